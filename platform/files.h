@@ -1,0 +1,53 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Reading and writing whole files so that nothing of the user's is lost.
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+
+#include <cstddef>
+
+namespace tervane {
+
+/// The outcome of a file operation: empty `error` means done. The error names the path, says why in words and what to
+/// do where that helps ("cannot write /data/x.tvd: no space left on the device; the file is unchanged").
+struct FileResult {
+  std::string error;
+  std::string note;  ///< Done, but the user should know: "hard link: the other names keep the old content".
+
+  bool Ok() const { return error.empty(); }
+};
+
+/// The bytes of a file, in one block without growth.
+struct FileContent {
+  std::unique_ptr<char[]> data;
+  std::size_t size = 0;
+
+  std::string_view Text() const { return {data.get(), size}; }
+};
+
+/// Reads a regular file whole. A folder, a FIFO or a device is refused at once, never waited for.
+FileResult ReadWholeFile(const std::string& path, FileContent& content);
+
+/// Replaces the file's content in one step: afterwards the old or the new file stands whole, also after a crash or a
+/// power cut. A new file is written beside it, compared in size, flushed, renamed over the target, and the folder is
+/// flushed. Permissions, owner, group and extended attributes of an old file are kept; a symbolic link stays and its
+/// target is replaced; a cycle of links, a folder and anything else that is no regular file are refused. When another
+/// hard link names the old file, that name keeps the old content and the note says so. On any failure the old file
+/// stands byte for byte and nothing is left beside it.
+FileResult WriteFileAtomically(const std::string& path, std::string_view content);
+
+/// Copies a file to a name that does not exist yet (an existing file is an error), flushed like an atomic write.
+FileResult CopyToNewFile(const std::string& from, const std::string& to);
+
+/// True when something stands at the path (a broken link counts).
+bool FileExists(const std::string& path);
+
+/// True when both paths lead to the same file.
+bool IsSameFile(const std::string& a, const std::string& b);
+
+}  // namespace tervane

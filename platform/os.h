@@ -1,0 +1,71 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The only place that calls the operating system directly; each call has its counterpart for Windows.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <system_error>
+
+namespace tervane::os {
+
+/// To be called once when a program starts: a file size limit or a closed pipe becomes an error of the write that met
+/// it, not the end of the process.
+void PrepareProcess();
+
+/// An open file. Closed by the destructor; `Close` tells the error that a close can report.
+class File {
+ public:
+  File() = default;
+  File(File&& other) noexcept;
+  File& operator=(File&& other) noexcept;
+  File(const File&) = delete;
+  File& operator=(const File&) = delete;
+  ~File();
+
+  /// Opens for reading without waiting for a writer (FIFO).
+  static File OpenForReading(const std::string& path, std::error_code& error);
+  /// Creates a file that must not exist yet, readable and writable as the process's mask allows.
+  static File CreateNew(const std::string& path, std::error_code& error);
+
+  bool IsOpen() const;
+  /// Reads up to `size` bytes; 0 at the end. Interrupted reads go on.
+  std::size_t Read(char* buffer, std::size_t size, std::error_code& error);
+  /// Writes all bytes or reports why not. Interrupted and short writes go on.
+  void WriteAll(std::string_view bytes, std::error_code& error);
+  void Flush(std::error_code& error);
+  void Close(std::error_code& error);
+
+  struct Status {
+    bool isRegular = false;
+    bool isFolder = false;
+    std::uint64_t size = 0;
+    std::uint64_t links = 1;
+  };
+  Status GetStatus(std::error_code& error) const;
+
+  /// Gives this file the owner, group, permissions and extended attributes of `other`. Where the process may not, the
+  /// name of what could not be kept is appended to `notKept`.
+  void TakeAttributesOf(const File& other, std::string& notKept, std::error_code& error);
+
+ private:
+#ifdef _WIN32
+  void* handle_ = nullptr;
+#else
+  int descriptor_ = -1;
+#endif
+};
+
+/// Renames over an existing file in one step.
+void RenameOver(const std::string& from, const std::string& to, std::error_code& error);
+/// Flushes a folder, so that a rename in it outlives a power cut.
+void FlushFolder(const std::string& folder, std::error_code& error);
+
+std::uint32_t ProcessId();
+/// The size of the process's resident memory in bytes, and its peak; 0 where unknown.
+std::uint64_t ResidentMemory();
+std::uint64_t PeakResidentMemory();
+
+}  // namespace tervane::os

@@ -1,0 +1,35 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Small operations on text that the standard library lacks. All text in the system is UTF-8.
+#pragma once
+
+#include <cstddef>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace tervane {
+
+/// The text without blanks, tabs and line ends at both sides.
+std::string_view Trimmed(std::string_view text);
+
+/// Equal when the case of ASCII letters is ignored.
+bool EqualIgnoringCase(std::string_view a, std::string_view b);
+
+/// The text with every `from` replaced by `to`; `from` must not be empty.
+std::string Replaced(std::string_view text, std::string_view from, std::string_view to);
+
+/// Place of the first byte that is no part of well-formed UTF-8 (overlong forms, surrogates and values above U+10FFFF
+/// are none), or nothing when the whole text is.
+std::optional<std::size_t> FirstInvalidUtf8(std::string_view text);
+
+/// Number of edits (insert, delete, replace one byte) that lead from one text to the other, for "did you mean".
+std::size_t EditDistance(std::string_view a, std::string_view b);
+
+/// Shortest decimal text that reads back to the same bits, whatever the process's locale: "0.1", "1e9", "-inf", "nan".
+/// A whole number of moderate size has neither point nor exponent: "6".
+std::string ShortestNumber(double value);
+std::string ShortestNumber(float value);
+
+}  // namespace tervane
