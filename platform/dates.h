@@ -23,7 +23,8 @@ struct CYbDateTimeSpan {
 };
 
 /// A date and time. It keeps the numbers that it was given, also when they name no date (month 13), so that a file's
-/// text survives; such a date is not valid, formats as "Invalid DateTime." and sorts before every valid one.
+/// text survives; such a date is not valid (valid are the years 1 to 9999), formats as "Invalid DateTime." and sorts
+/// before every valid one.
 class CYbDateTime {
  public:
   /// Year 0, month 0, day 0: not valid.
@@ -31,8 +32,9 @@ class CYbDateTime {
   CYbDateTime(int year, int month, int day, int hour = 0, int minute = 0, int second = 0)
       : fields_{year, month, day, hour, minute, second} {}
 
-  /// Reads a text by a format of %Y %m %d %H %M %S and literal characters; further text that the format does not
-  /// cover is ignored. What cannot be read gives a date that is not valid.
+  /// Reads a text by a format of %Y %m %d %H %M %S and literal characters; blanks in front, fewer digits and more or
+  /// fewer blanks between are fine, and further text that the format does not cover is ignored. What cannot be read
+  /// gives a date that is not valid.
   static CYbDateTime Parse(std::string_view text, std::string_view format);
 
   bool IsValid() const;
@@ -50,6 +52,8 @@ class CYbDateTime {
   std::int64_t SecondsSinceEpoch() const;
   static CYbDateTime FromSecondsSinceEpoch(std::int64_t seconds);
 
+  /// A date that is not valid stays as it is; the difference to one is 0. A sum outside the years 1 to 9999 is not
+  /// valid.
   CYbDateTime operator+(CYbDateTimeSpan span) const;
   CYbDateTimeSpan operator-(const CYbDateTime& other) const;
   std::weak_ordering operator<=>(const CYbDateTime& other) const;

@@ -4,12 +4,11 @@
 // Reading and writing whole files so that nothing of the user's is lost.
 #pragma once
 
+#include <cstddef>
 #include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
-
-#include <cstddef>
 
 namespace tervane {
 

@@ -4,6 +4,7 @@
 // The only place that calls the operating system directly; each call has its counterpart for Windows.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <string_view>
@@ -27,8 +28,9 @@ class File {
 
   /// Opens for reading without waiting for a writer (FIFO).
   static File OpenForReading(const std::string& path, std::error_code& error);
-  /// Creates a file that must not exist yet, readable and writable as the process's mask allows.
-  static File CreateNew(const std::string& path, std::error_code& error);
+  /// Creates a file that must not exist yet, readable and writable as the process's mask allows, or by its owner only.
+  enum class Access { AsMaskAllows, OwnerOnly };
+  static File CreateNew(const std::string& path, Access access, std::error_code& error);
 
   bool IsOpen() const;
   /// Reads up to `size` bytes; 0 at the end. Interrupted reads go on.
@@ -46,8 +48,9 @@ class File {
   };
   Status GetStatus(std::error_code& error) const;
 
-  /// Gives this file the owner, group, permissions and extended attributes of `other`. Where the process may not, the
-  /// name of what could not be kept is appended to `notKept`.
+  /// Gives this file the owner, group, permissions and extended attributes (access control lists among them) of
+  /// `other`. Where the process or the file system may not, the name of what could not be kept is appended to
+  /// `notKept`.
   void TakeAttributesOf(const File& other, std::string& notKept, std::error_code& error);
 
  private:
@@ -58,12 +61,19 @@ class File {
 #endif
 };
 
+/// True when the user may write to the file; where nothing stands, `error` tells.
+bool MayWrite(const std::string& path, std::error_code& error);
 /// Renames over an existing file in one step.
 void RenameOver(const std::string& from, const std::string& to, std::error_code& error);
-/// Flushes a folder, so that a rename in it outlives a power cut.
+/// Renames to a name at which nothing may stand, else the error says that something exists.
+void RenameToNew(const std::string& from, const std::string& to, std::error_code& error);
+/// Flushes a folder, so that a rename in it outlives a power cut. File systems that cannot do so are left alone.
 void FlushFolder(const std::string& folder, std::error_code& error);
 
 std::uint32_t ProcessId();
+/// True when a process with this number runs on this machine, also one of another user.
+bool IsProcessAlive(std::uint32_t processId);
+std::string HostName();
 /// The size of the process's resident memory in bytes, and its peak; 0 where unknown.
 std::uint64_t ResidentMemory();
 std::uint64_t PeakResidentMemory();

@@ -28,7 +28,7 @@ std::optional<std::size_t> FirstInvalidUtf8(std::string_view text);
 std::size_t EditDistance(std::string_view a, std::string_view b);
 
 /// Shortest decimal text that reads back to the same bits, whatever the process's locale: "0.1", "1e9", "-inf", "nan".
-/// A whole number of moderate size has neither point nor exponent: "6".
+/// A whole number below 1e9 has neither point nor exponent: "6", "100000".
 std::string ShortestNumber(double value);
 std::string ShortestNumber(float value);
 

@@ -1,0 +1,122 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "platform/text.h"
+
+#include <algorithm>
+#include <charconv>
+#include <cmath>
+#include <cstdint>
+#include <cstring>
+#include <iterator>
+#include <numeric>
+#include <utility>
+#include <vector>
+
+namespace tervane {
+namespace {
+
+char LowerAscii(char letter) { return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter; }
+
+/// Length of the well-formed sequence of more than one byte at the text's start, or 0 when none stands there.
+std::size_t MultiByteLength(std::string_view text) {
+  const auto byte = [&](std::size_t i) { return i < text.size() ? static_cast<unsigned char>(text[i]) : 0u; };
+  const auto continues = [&](std::size_t i) { return (byte(i) & 0xC0u) == 0x80u; };
+  const unsigned lead = byte(0);
+  if (lead >= 0xC2 && lead <= 0xDF) return continues(1) ? 2 : 0;
+  if (lead >= 0xE0 && lead <= 0xEF) {
+    if (lead == 0xE0 && byte(1) < 0xA0) return 0;  // overlong
+    if (lead == 0xED && byte(1) > 0x9F) return 0;  // surrogate
+    return continues(1) && continues(2) ? 3 : 0;
+  }
+  if (lead >= 0xF0 && lead <= 0xF4) {
+    if (lead == 0xF0 && byte(1) < 0x90) return 0;  // overlong
+    if (lead == 0xF4 && byte(1) > 0x8F) return 0;  // above U+10FFFF
+    return continues(1) && continues(2) && continues(3) ? 4 : 0;
+  }
+  return 0;
+}
+
+/// std::to_chars writes an exponent with a sign and at least two digits: "1e+09" becomes "1e9".
+std::string WithShortExponent(std::string_view number) {
+  const std::size_t e = number.find('e');
+  if (e == std::string_view::npos) return std::string(number);
+  std::string text(number.substr(0, e + 1));
+  if (number[e + 1] == '-') text += '-';
+  const std::size_t firstDigit = number.find_first_not_of("+-0", e + 1);
+  return text += number.substr(firstDigit);
+}
+
+template <typename Number>
+std::string Shortest(Number value) {
+  if (std::isnan(value)) return "nan";
+  char buffer[64];
+  // "100000" is longer than "1e5", but what a reader expects of a count or a coordinate.
+  const bool isModerateWhole = std::abs(value) < Number(1e9) && std::trunc(value) == value;
+  const std::to_chars_result result = isModerateWhole
+                                          ? std::to_chars(buffer, std::end(buffer), value, std::chars_format::fixed)
+                                          : std::to_chars(buffer, std::end(buffer), value);
+  return WithShortExponent({buffer, static_cast<std::size_t>(result.ptr - buffer)});
+}
+
+}  // namespace
+
+std::string_view Trimmed(std::string_view text) {
+  constexpr std::string_view kBlanks = " \t\r\n";
+  const std::size_t begin = text.find_first_not_of(kBlanks);
+  if (begin == std::string_view::npos) return {};
+  return text.substr(begin, text.find_last_not_of(kBlanks) - begin + 1);
+}
+
+bool EqualIgnoringCase(std::string_view a, std::string_view b) {
+  return std::equal(a.begin(), a.end(), b.begin(), b.end(),
+                    [](char x, char y) { return LowerAscii(x) == LowerAscii(y); });
+}
+
+std::string Replaced(std::string_view text, std::string_view from, std::string_view to) {
+  std::string result;
+  result.reserve(text.size());
+  std::size_t done = 0;
+  for (std::size_t found; (found = text.find(from, done)) != std::string_view::npos; done = found + from.size()) {
+    result.append(text, done, found - done).append(to);
+  }
+  return result.append(text, done);
+}
+
+std::optional<std::size_t> FirstInvalidUtf8(std::string_view text) {
+  std::size_t place = 0;
+  while (place < text.size()) {
+    // Setups are nearly all ASCII: eight bytes in one step.
+    std::uint64_t eight;
+    while (text.size() - place >= sizeof eight) {
+      std::memcpy(&eight, text.data() + place, sizeof eight);
+      if ((eight & 0x8080808080808080u) != 0) break;
+      place += sizeof eight;
+    }
+    if (place == text.size()) break;
+    const bool isAscii = static_cast<unsigned char>(text[place]) < 0x80;
+    const std::size_t length = isAscii ? 1 : MultiByteLength(text.substr(place));
+    if (length == 0) return place;
+    place += length;
+  }
+  return std::nullopt;
+}
+
+std::size_t EditDistance(std::string_view a, std::string_view b) {
+  // One row of the table of distances between the beginnings of both texts.
+  std::vector<std::size_t> row(b.size() + 1);
+  std::iota(row.begin(), row.end(), std::size_t{0});
+  for (std::size_t i = 0; i < a.size(); ++i) {
+    std::size_t diagonal = std::exchange(row[0], i + 1);
+    for (std::size_t j = 0; j < b.size(); ++j) {
+      const std::size_t replaced = diagonal + (a[i] == b[j] ? 0 : 1);
+      diagonal = row[j + 1];
+      row[j + 1] = std::min({replaced, diagonal + 1, row[j] + 1});
+    }
+  }
+  return row[b.size()];
+}
+
+std::string ShortestNumber(double value) { return Shortest(value); }
+std::string ShortestNumber(float value) { return Shortest(value); }
+
+}  // namespace tervane
