@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/files.h"
 
+#include <algorithm>
 #include <atomic>
 #include <charconv>
 #include <chrono>
@@ -246,7 +247,7 @@ ReadOutcome ReadOnce(const std::string& path, FileContent& content, Reason& reas
   if (!reason.empty()) return ReadOutcome::Failed;
   const auto size = static_cast<std::size_t>(status.size);
   content = {};
-  content.data = std::make_unique_for_overwrite<char[]>(size);
+  content.data = std::make_unique_for_overwrite<char[]>(size + 1);
   std::error_code error;
   while (content.size < size) {
     const std::size_t done = file.Read(content.data.get() + content.size, size - content.size, error);
@@ -257,6 +258,7 @@ ReadOutcome ReadOnce(const std::string& path, FileContent& content, Reason& reas
     if (done == 0) return ReadOutcome::Shrunk;
     content.size += done;
   }
+  content.data[size] = '\0';
   char more;
   return file.Read(&more, 1, error) == 0 ? ReadOutcome::Done : ReadOutcome::Grown;
 }
@@ -292,6 +294,14 @@ Reason OpenOldFile(const fs::path& target, os::File& old, os::File::Status& stat
 }
 
 }  // namespace
+
+FileContent FileContent::Of(std::string_view text) {
+  FileContent content;
+  content.data = std::make_unique_for_overwrite<char[]>(text.size() + 1);
+  content.size = text.size();
+  *std::copy(text.begin(), text.end(), content.data.get()) = '\0';
+  return content;
+}
 
 FileResult ReadWholeFile(const std::string& path, FileContent& content) {
   FileResult result;

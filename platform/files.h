@@ -21,11 +21,12 @@ struct FileResult {
   bool Ok() const { return error.empty(); }
 };
 
-/// The bytes of a file, in one block without growth.
+/// The bytes of a file, in one block without growth, followed by a NUL.
 struct FileContent {
   std::unique_ptr<char[]> data;
   std::size_t size = 0;
 
+  static FileContent Of(std::string_view text);
   std::string_view Text() const { return {data.get(), size}; }
 };
 

@@ -21,9 +21,11 @@
 #include <cstdlib>
 #include <cstring>
 #include <fstream>
+#include <memory>
 #include <string_view>
 #include <vector>
 
+#include <cxxabi.h>
 #include <fcntl.h>
 #include <signal.h>
 #include <sys/stat.h>
@@ -148,6 +150,12 @@ void RenameToNew(const std::string& from, const std::string& to, std::error_code
 void FlushFolder(const std::string&, std::error_code& error) {
   // MOVEFILE_WRITE_THROUGH has done it.
   error.clear();
+}
+
+std::string DemangledName(const std::type_info& type) {
+  // "class tervane::CGlobal"
+  const std::string_view name = type.name();
+  return std::string(name.substr(name.rfind(' ') + 1));
 }
 
 std::uint32_t ProcessId() { return GetCurrentProcessId(); }
@@ -387,6 +395,13 @@ void FlushFolder(const std::string& folder, std::error_code& error) {
       error == std::errc::permission_denied) {
     error.clear();
   }
+}
+
+std::string DemangledName(const std::type_info& type) {
+  int status = 0;
+  const std::unique_ptr<char, void (*)(void*)> name(abi::__cxa_demangle(type.name(), nullptr, nullptr, &status),
+                                                    std::free);
+  return status == 0 ? name.get() : type.name();
 }
 
 std::uint32_t ProcessId() { return static_cast<std::uint32_t>(getpid()); }

@@ -9,6 +9,7 @@
 #include <string>
 #include <string_view>
 #include <system_error>
+#include <typeinfo>
 
 namespace tervane::os {
 
@@ -69,6 +70,9 @@ void RenameOver(const std::string& from, const std::string& to, std::error_code&
 void RenameToNew(const std::string& from, const std::string& to, std::error_code& error);
 /// Flushes a folder, so that a rename in it outlives a power cut. File systems that cannot do so are left alone.
 void FlushFolder(const std::string& folder, std::error_code& error);
+
+/// Name of a type as it stands in the source, with its namespaces.
+std::string DemangledName(const std::type_info& type);
 
 std::uint32_t ProcessId();
 /// True when a process with this number runs on this machine, also one of another user.

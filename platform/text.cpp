@@ -36,26 +36,34 @@ std::size_t MultiByteLength(std::string_view text) {
   return 0;
 }
 
-/// std::to_chars writes an exponent with a sign and at least two digits: "1e+09" becomes "1e9".
-std::string WithShortExponent(std::string_view number) {
-  const std::size_t e = number.find('e');
-  if (e == std::string_view::npos) return std::string(number);
-  std::string text(number.substr(0, e + 1));
-  if (number[e + 1] == '-') text += '-';
-  const std::size_t firstDigit = number.find_first_not_of("+-0", e + 1);
-  return text += number.substr(firstDigit);
+/// std::to_chars writes an exponent with a sign and at least two digits: "1e+09" becomes "1e9". Gives the new end.
+char* ShortenExponent(char* begin, char* end) {
+  char* out = std::find(begin, end, 'e');
+  if (out == end) return end;
+  ++out;
+  const char* in = out;
+  if (*in == '-') ++out;
+  in = std::find_if(in, static_cast<const char*>(end), [](char c) { return c >= '1' && c <= '9'; });
+  return std::copy(in, static_cast<const char*>(end), out);
 }
 
 template <typename Number>
-std::string Shortest(Number value) {
-  if (std::isnan(value)) return "nan";
-  char buffer[64];
+char* Shortest(Number value, char* buffer) {
+  constexpr std::string_view kNotANumber = "nan";
+  if (std::isnan(value)) return std::copy(kNotANumber.begin(), kNotANumber.end(), buffer);
+  char* const bufferEnd = buffer + kNumberBuffer;
   // "100000" is longer than "1e5", but what a reader expects of a count or a coordinate.
   const bool isModerateWhole = std::abs(value) < Number(1e9) && std::trunc(value) == value;
   const std::to_chars_result result = isModerateWhole
-                                          ? std::to_chars(buffer, std::end(buffer), value, std::chars_format::fixed)
-                                          : std::to_chars(buffer, std::end(buffer), value);
-  return WithShortExponent({buffer, static_cast<std::size_t>(result.ptr - buffer)});
+                                          ? std::to_chars(buffer, bufferEnd, value, std::chars_format::fixed)
+                                          : std::to_chars(buffer, bufferEnd, value);
+  return ShortenExponent(buffer, result.ptr);
+}
+
+template <typename Number>
+std::string ShortestText(Number value) {
+  char buffer[kNumberBuffer];
+  return {buffer, Shortest(value, buffer)};
 }
 
 }  // namespace
@@ -116,7 +124,9 @@ std::size_t EditDistance(std::string_view a, std::string_view b) {
   return row[b.size()];
 }
 
-std::string ShortestNumber(double value) { return Shortest(value); }
-std::string ShortestNumber(float value) { return Shortest(value); }
+std::string ShortestNumber(double value) { return ShortestText(value); }
+std::string ShortestNumber(float value) { return ShortestText(value); }
+char* ShortestNumber(double value, char* buffer) { return Shortest(value, buffer); }
+char* ShortestNumber(float value, char* buffer) { return Shortest(value, buffer); }
 
 }  // namespace tervane

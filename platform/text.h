@@ -32,4 +32,9 @@ std::size_t EditDistance(std::string_view a, std::string_view b);
 std::string ShortestNumber(double value);
 std::string ShortestNumber(float value);
 
+/// The same into a buffer of at least `kNumberBuffer` bytes; gives the end of the text.
+inline constexpr int kNumberBuffer = 40;
+char* ShortestNumber(double value, char* buffer);
+char* ShortestNumber(float value, char* buffer);
+
 }  // namespace tervane

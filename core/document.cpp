@@ -1,0 +1,135 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "core/document.h"
+
+#include <fmt/format.h>
+
+#include "core/doc_version.h"
+#include "core/kvf_parser.h"
+#include "core/kvf_writer.h"
+#include "platform/files.h"
+#include "platform/paths.h"
+
+namespace tervane {
+
+namespace {
+
+/// Closes a file at the end of a scope.
+struct OpenFile {
+  KvfFile* file;
+  ~OpenFile() { kvfClose(&file); }
+};
+
+}  // namespace
+
+CYbSEDocument::CYbSEDocument(std::unique_ptr<CYbSEKvfGlobalBase> root) : root_(std::move(root)) {}
+
+bool CYbSEDocument::OnOpenDocument(const std::string& path) {
+  KvfFile* file = kvfLoadFile(path, 0);
+  if (kvfGetErrorGlb() != kKvfNoError) {
+    error_ = kvfErrorText();
+    kvfClose(&file);
+    return false;
+  }
+  return LoadTree(file, path);
+}
+
+bool CYbSEDocument::OpenText(std::string_view text, const std::string& path) {
+  KvfFile* file = kvfCreate();
+  file->path = path;
+  file->folder = FolderOf(AbsoluteFromHere(path));
+  file->text = FileContent::Of(text);
+  if (!ParseKvf(*file)) {
+    error_ = fmt::format("{}:{}", path, file->syntaxError.message);
+    kvfClose(&file);
+    return false;
+  }
+  return LoadTree(file, path);
+}
+
+bool CYbSEDocument::LoadTree(KvfFile* file, const std::string& path) {
+  const OpenFile closer{file};
+  if (!kvfTargetByNameNum(file, root_->GetTargetName(), 1)) {
+    const KvfNode* first = file->top.firstChild;
+    error_ = fmt::format("{}:{}:1: target {} was expected: target {} is no setup", path, file->LineOf(*first),
+                         root_->GetTargetName(), first->Name());
+    return false;
+  }
+  path_ = path;
+  header_ = file->header;
+  root_->Load(&file->top);
+
+  int useCustom = 0;
+  std::string folder;
+  kvfGetProjectResultRoot(file);
+  kvfGetCustomResultFolder(file, &useCustom, &folder);
+  UseCustomResultFolder = useCustom != 0;
+  CustomResultFolder = FileName(folder, file->folder);
+
+  for (KvfPlacedNote& note : CollectNotes(*file))
+    report_.entries.push_back(
+        {LoadReport::Kind::Note, note.line, std::move(note.path), std::move(note.key), std::move(note.text)});
+  report_.unread = CollectUnread(*file);
+  keepOriginal_ = !report_.unread.empty() || root_->ReadDocVersion() != CFlowModelDocVersionKvf::kWrittenVersion;
+  OnLoaded();
+  modified_ = false;
+  return true;
+}
+
+KvfFile* CYbSEDocument::BuildFile(const std::string& folder) const {
+  KvfFile* file = kvfCreate();
+  file->folder = folder;
+  root_->Save(file);
+  if (UseCustomResultFolder || !CustomResultFolder.IsEmpty())
+    kvfSetCustomResultFolder(file, UseCustomResultFolder, CustomResultFolder.TextIn(folder));
+  return file;
+}
+
+bool CYbSEDocument::BuildText(const std::string& folder, std::string& text, std::string& error) const {
+  const OpenFile built{BuildFile(folder)};
+  built.file->header = header_;
+  return WriteKvfText(*built.file, text, error);
+}
+
+bool CYbSEDocument::KeepOriginal() {
+  const int version = root_->ReadDocVersion();
+  const std::string folder(FolderOf(path_));
+  const std::string stem = fmt::format("{}{}{}.v{}", folder, folder.empty() || EndsInSeparator(folder) ? "" : "/",
+                                       BaseNameOf(path_), version < 0 ? "none" : std::to_string(version));
+  std::string copy = fmt::format("{}{}", stem, ExtensionOf(path_));
+  for (int number = 2; FileExists(copy); ++number) copy = fmt::format("{}.{}{}", stem, number, ExtensionOf(path_));
+  if (const FileResult result = CopyToNewFile(path_, copy); !result.Ok()) {
+    error_ = fmt::format("the original could not be kept, so nothing was saved: {}", result.error);
+    return false;
+  }
+  saveNotes_.push_back(fmt::format("the file as it was is kept as {}", copy));
+  return true;
+}
+
+bool CYbSEDocument::OnSaveDocument(const std::string& path) {
+  saveNotes_.clear();
+  std::string text, reason;
+  if (!BuildText(std::string(FolderOf(AbsoluteFromHere(path))), text, reason)) {
+    error_ = fmt::format("cannot write {}: {}", path, reason);
+    return false;
+  }
+  const bool overwritesOriginal = keepOriginal_ && (path == path_ || IsSameFile(path, path_));
+  if (overwritesOriginal && !KeepOriginal()) return false;
+  const FileResult result = WriteFileAtomically(path, text);
+  if (!result.Ok()) {
+    error_ = result.error;
+    return false;
+  }
+  if (!result.note.empty()) saveNotes_.push_back(result.note);
+  if (overwritesOriginal) keepOriginal_ = false;
+  path_ = path;
+  modified_ = false;
+  return true;
+}
+
+std::string CYbSEDocument::getResultFolder() const {
+  if (UseCustomResultFolder && !CustomResultFolder.IsEmpty()) return CustomResultFolder.Absolute();
+  return ResolvedPath(fmt::format("{}_results", BaseNameOf(path_)), FolderOf(AbsoluteFromHere(path_)));
+}
+
+}  // namespace tervane

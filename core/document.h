@@ -1,0 +1,88 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "core/node.h"
+
+namespace tervane {
+
+/// What a program shows after opening a setup: what the reading met, and what the file holds that nothing reads.
+struct LoadReport {
+  enum class Kind { Note, Warning };
+  struct Entry {
+    Kind kind;
+    int line;          ///< 0 when it speaks of no line.
+    std::string path;  ///< Of the node; may be empty.
+    std::string key;   ///< May be empty.
+    std::string text;
+  };
+
+  std::vector<Entry> entries;
+  std::vector<KvfUnread> unread;
+
+  bool IsEmpty() const { return entries.empty() && unread.empty(); }
+};
+
+/// The document of a setup editor, without its window: the file, its result folder, and the road between file and tree.
+class CYbSEDocument {
+ public:
+  explicit CYbSEDocument(std::unique_ptr<CYbSEKvfGlobalBase> root);
+  virtual ~CYbSEDocument() = default;
+  CYbSEDocument(const CYbSEDocument&) = delete;
+  CYbSEDocument& operator=(const CYbSEDocument&) = delete;
+
+  CYbSEKvfGlobalBase& Root() const { return *root_; }
+  const std::string& PathName() const { return path_; }
+  bool IsModified() const { return modified_; }
+  void SetModified(bool modified) { modified_ = modified; }
+  const LoadReport& Report() const { return report_; }
+
+  /// Loads a setup into a tree at its defaults. False when the file cannot be read, is no parameter file or lacks the
+  /// target: `Error` says why, and the document is not to be used.
+  virtual bool OnOpenDocument(const std::string& path);
+  /// The same from a text in memory; `path` stands for its place in messages and names.
+  bool OpenText(std::string_view text, const std::string& path);
+  /// Saves under that path, atomically. The first save over the file that was read keeps that file beside it when it
+  /// holds what nothing reads or was written by an older version. False when it failed; the old file then stands.
+  virtual bool OnSaveDocument(const std::string& path);
+  const std::string& Error() const { return error_; }
+  /// What the user should know of the latest save: where the original was kept, a hard link.
+  const std::vector<std::string>& SaveNotes() const { return saveNotes_; }
+
+  /// The file as it would be written to that folder; to be closed by the caller.
+  KvfFile* BuildFile(const std::string& folder) const;
+  /// The text of that file; empty with an error when it cannot be written.
+  bool BuildText(const std::string& folder, std::string& text, std::string& error) const;
+
+  /// The folder of the results: the custom folder when it is in use, else BASENAME_results beside the setup.
+  std::string getResultFolder() const;
+  bool UseCustomResultFolder = false;
+  FileName CustomResultFolder;
+
+ protected:
+  /// What a kind of document does when its tree has been read.
+  virtual void OnLoaded() {}
+  void AddToReport(LoadReport::Kind kind, std::string text) {
+    report_.entries.push_back({kind, 0, {}, {}, std::move(text)});
+  }
+
+ private:
+  bool LoadTree(KvfFile* file, const std::string& path);
+  /// Copies the file that was read beside it; false when that failed.
+  bool KeepOriginal();
+
+  std::unique_ptr<CYbSEKvfGlobalBase> root_;
+  std::string path_;
+  std::string error_;
+  std::string header_;  ///< Comments in front of the first target.
+  LoadReport report_;
+  std::vector<std::string> saveNotes_;
+  bool modified_ = false;
+  bool keepOriginal_ = false;  ///< The file that was read holds what the next save will not.
+};
+
+}  // namespace tervane

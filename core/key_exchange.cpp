@@ -1,0 +1,97 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "core/key_exchange.h"
+
+#include <fmt/format.h>
+
+#include "core/kvf_writer.h"
+#include "core/list.h"
+
+namespace tervane {
+
+KeyExchange KeyExchange::Reading(KvfNode* section, int docVersion) {
+  // A missing section reads like an empty one.
+  static KvfSection empty;
+  KeyExchange keys;
+  keys.section_ = section ? section : &empty;
+  keys.docVersion_ = docVersion;
+  return keys;
+}
+
+KeyExchange KeyExchange::Writing(KvfFile* file) {
+  KeyExchange keys;
+  keys.file_ = file;
+  return keys;
+}
+
+KeyExchange KeyExchange::Describing(std::vector<KeyInfo>& described, int docVersion) {
+  KeyExchange keys;
+  keys.scratch_ = std::make_shared<KvfFile>();
+  keys.file_ = keys.scratch_.get();
+  keys.keys_ = &described;
+  keys.docVersion_ = docVersion;
+  kvfAddTarget(keys.file_, "Keys");
+  return keys;
+}
+
+bool KeyExchange::Reads(const Rule& rule) {
+  if (docVersion_ >= rule.since && docVersion_ <= rule.until) return true;
+  kvfMarkKnown(section_, rule.key);
+  return false;
+}
+
+void KeyExchange::Describe(const Rule& rule, std::string_view type) {
+  const KvfNode* keyword = file_->currentKeyword;
+  if (!keyword) return;
+  keys_->push_back({std::string(rule.key), std::string(type), rule.written ? KvfValuesText(*keyword) : std::string(),
+                    rule.since, rule.until, rule.written});
+}
+
+void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
+  int year = value.Year(), month = value.Month(), day = value.Day();
+  if (IsReading()) {
+    if (kvfGetListParam(section_, key, 1, "iii", &year, &month, &day)) value = CYbDateTime(year, month, day);
+    return;
+  }
+  kvfPutListParam(file_, key, "iii", year, month, day);
+  if (keys_) Describe({key}, "day");
+}
+
+void KeyExchange::Count(std::string_view key, CYbSEKvfListBaseInterface& list) {
+  if (IsReading()) {
+    list.ReadItemCount(section_, key);
+    return;
+  }
+  int count = list.GetChildCount();
+  Exchange({key}, count);
+}
+
+bool KeyExchange::Read(std::string_view key, FileName& value) {
+  const KvfNode* keyword = kvfKeywordByNameNum(section_, key, 1);
+  std::string absolute;
+  // The absolute form is asked for its notes on a wrong type; what is kept is the text as it stood.
+  if (!keyword || !kvfGetParamFilename(section_, key, &absolute, 1, 1)) return false;
+  value = FileName(std::string(keyword->params[0].Text()), kvfFolderOf(section_));
+  return true;
+}
+
+bool KeyExchange::Read(std::string_view key, CYbDateTime& value) {
+  int year = 0, month = 0, day = 0, hour = 0, minute = 0;
+  if (!kvfGetListParam(section_, key, 1, "iiiii", &year, &month, &day, &hour, &minute)) return false;
+  value = CYbDateTime(year, month, day, hour, minute);
+  // Five zeros stand for "no date".
+  const bool isEmpty = year == 0 && month == 0 && day == 0 && hour == 0 && minute == 0;
+  if (!value.IsValid() && !isEmpty)
+    kvfAddNote(section_, key, "year, month, day, hour, minute that name a date were expected");
+  return true;
+}
+
+void KeyExchange::Write(std::string_view key, const FileName& value) {
+  kvfPutParamFilename(file_, key, value.TextIn(file_->folder));
+}
+
+void KeyExchange::Write(std::string_view key, const CYbDateTime& value) {
+  kvfPutListParam(file_, key, "iiiii", value.Year(), value.Month(), value.Day(), value.Hour(), value.Minute());
+}
+
+}  // namespace tervane

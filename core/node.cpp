@@ -1,0 +1,308 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "core/node.h"
+
+#include <algorithm>
+#include <typeinfo>
+
+#include <fmt/format.h>
+
+#include "platform/os.h"
+
+namespace tervane {
+
+CYbSEKvfBase::CYbSEKvfBase(std::string title, std::string sectionName, CYbSEKvfBase* parent)
+    : parent_(parent),
+      root_(parent ? parent->root_ : nullptr),
+      title_(std::move(title)),
+      sectionName_(std::move(sectionName)) {}
+
+CYbSEKvfBase::~CYbSEKvfBase() {
+  if (isImportant_ && root_ && root_ != this) root_->UnregisterNode(this);
+}
+
+// ---- Tree
+
+void CYbSEKvfBase::AddChild(std::unique_ptr<CYbSEKvfBase> child) {
+  const auto place = children_.begin() + static_cast<std::ptrdiff_t>(plainChildren_++);
+  children_.insert(place, std::move(child));
+}
+
+std::unique_ptr<CYbSEKvfBase> CYbSEKvfBase::RemoveChild(CYbSEKvfBase* child) {
+  const std::ptrdiff_t place = PlaceOf(child);
+  if (place < 0) return nullptr;
+  std::unique_ptr<CYbSEKvfBase> removed = std::move(children_[static_cast<std::size_t>(place)]);
+  children_.erase(children_.begin() + place);
+  if (static_cast<std::size_t>(place) < plainChildren_) --plainChildren_;
+  return removed;
+}
+
+void CYbSEKvfBase::SwapChilds(CYbSEKvfBase* a, CYbSEKvfBase* b) {
+  const std::ptrdiff_t placeA = PlaceOf(a);
+  const std::ptrdiff_t placeB = PlaceOf(b);
+  if (placeA >= 0 && placeB >= 0)
+    std::swap(children_[static_cast<std::size_t>(placeA)], children_[static_cast<std::size_t>(placeB)]);
+}
+
+CYbSEKvfBase* CYbSEKvfBase::GetNextChild(const CYbSEKvfBase* child) const {
+  const std::ptrdiff_t place = PlaceOf(child);
+  const auto next = static_cast<std::size_t>(place + 1);
+  return place >= 0 && next < children_.size() ? children_[next].get() : nullptr;
+}
+
+CYbSEKvfBase* CYbSEKvfBase::GetChild(int number) const {
+  return number >= 1 && number <= static_cast<int>(children_.size())
+             ? children_[static_cast<std::size_t>(number - 1)].get()
+             : nullptr;
+}
+
+int CYbSEKvfBase::GetNumberWhatIs(const CYbSEKvfBase* child) const {
+  const std::ptrdiff_t place = PlaceOf(child);
+  return place < 0 ? -1 : static_cast<int>(place) + 1;
+}
+
+std::ptrdiff_t CYbSEKvfBase::PlaceOf(const CYbSEKvfBase* child) const {
+  if (!child) return -1;
+  const auto isAtHint = [&] {
+    return child->placeHint_ < children_.size() && children_[child->placeHint_].get() == child;
+  };
+  // After a change all places are numbered anew, so that a walk over n children costs n steps.
+  if (!isAtHint() && child->parent_ == this)
+    for (std::size_t place = 0; place < children_.size(); ++place)
+      children_[place]->placeHint_ = static_cast<std::uint32_t>(place);
+  return isAtHint() ? static_cast<std::ptrdiff_t>(child->placeHint_) : -1;
+}
+
+CYbSEKvfBase* CYbSEKvfBase::GetProperty(int number) const {
+  return number >= 1 && number <= GetPropertyCount() ? properties_[static_cast<std::size_t>(number - 1)].get()
+                                                     : nullptr;
+}
+
+CYbSEKvfBase* CYbSEKvfBase::ImportantNode(std::string_view name) const {
+  return root_ ? root_->GetImportantNode(name) : nullptr;
+}
+
+// ---- Section
+
+std::string CYbSEKvfBase::FormattedSectionName() const {
+  const std::string& name = GetSectionName();
+  const std::size_t place = name.find("%d");
+  if (place == std::string::npos) return name;
+  return fmt::format("{}{}{}", std::string_view(name).substr(0, place), GetNumberWhatAmI(),
+                     std::string_view(name).substr(place + 2));
+}
+
+int CYbSEKvfBase::GetNumberWhatAmI() const {
+  if (sectionNumber_ >= 0) return sectionNumber_;
+  return parent_ ? parent_->GetNumberWhatIs(this) : -1;
+}
+
+KvfNode* CYbSEKvfBase::FindSection(KvfNode* parentSection) const {
+  return kvfSectionByNameNum(parentSection, FormattedSectionName(), sectionInstance_);
+}
+
+void CYbSEKvfBase::SetHelp(std::string helpFile, std::string page) {
+  helpFile_ = std::move(helpFile);
+  helpPage_ = std::move(page);
+}
+
+// ---- File
+
+void CYbSEKvfBase::Load(KvfNode* parentSection) {
+  if (!GetSectionUsed()) return;
+  KvfNode* section = parentSection;
+  if (GetSectionName().empty()) {
+    if (parent_) touched_ = parent_->touched_;
+  } else {
+    section = FindSection(parentSection);
+    hadSection_ = section != nullptr;
+    if (!section) return;
+    ReadTouched(section);
+  }
+  LoadSize(section);
+  ReadData(section);
+  LoadChildren(section);
+}
+
+void CYbSEKvfBase::ReadTouched(KvfNode* section) {
+  kvfGetParam(section, "Touched", &touched_, 1, 1);
+  // Computed anew at every save.
+  kvfMarkKnown(section, "IsDataUsedInSetup");
+}
+
+void CYbSEKvfBase::LoadChildren(KvfNode* section) {
+  for (const auto& property : properties_) property->Load(section);
+  // Like sections without a number in their name are told apart by their place among each other.
+  std::unordered_map<std::string, int> instances;
+  // By place, since a node that is read may give children to others.
+  for (std::size_t place = 0; place < children_.size(); ++place) {
+    CYbSEKvfBase& child = *children_[place];
+    const std::string& name = child.GetSectionName();
+    if (!name.empty() && name.find("%d") == std::string::npos) child.sectionInstance_ = ++instances[name];
+    child.Load(section);
+  }
+}
+
+void CYbSEKvfBase::Save(KvfFile* file) {
+  if (!GetSectionUsed()) return;
+  const bool hasSection = !GetSectionName().empty();
+  if (hasSection) {
+    kvfAddSection(file, FormattedSectionName());
+    kvfPutParam(file, "Touched", touched_);
+    if (root_ && root_->WriteUsedFlags()) kvfPutParam(file, "IsDataUsedInSetup", IsDataUsedInSetup());
+    SaveSize(file);
+  }
+  WriteData(file);
+  for (const auto& property : properties_) property->Save(file);
+  for (const auto& child : children_) child->Save(file);
+  if (hasSection) kvfEndSection(file);
+}
+
+void CYbSEKvfBase::ReadData(KvfNode* section) {
+  KeyExchange keys = KeyExchange::Reading(section, root_ ? root_->ReadDocVersion() : -1);
+  ExchangeKeys(keys);
+}
+
+void CYbSEKvfBase::WriteData(KvfFile* file) {
+  KeyExchange keys = KeyExchange::Writing(file);
+  ExchangeKeys(keys);
+}
+
+void CYbSEKvfBase::DescribeKeys(std::vector<KeyInfo>& keys) {
+  KeyExchange describing = KeyExchange::Describing(keys, root_ ? root_->ReadDocVersion() : -1);
+  ExchangeKeys(describing);
+}
+
+void CYbSEKvfBase::TouchAllChildren() {
+  for (const auto& child : children_) {
+    child->Touch();
+    child->TouchAllChildren();
+  }
+}
+
+// ---- Taking part and validation
+
+int CYbSEKvfBase::IsDataUsedInSetup() {
+  for (CYbSEKvfBase* node = this; node; node = node->parent_)
+    if (!node->IsDlgUsedInSetup()) return 0;
+  return 1;
+}
+
+int CYbSEKvfBase::Validate() {
+  findings_.clear();
+  valid_ = 1;
+  if (IsDataUsedInSetup()) {
+    valid_ = ValidateData() != 0 && std::none_of(findings_.begin(), findings_.end(), [](const Finding& finding) {
+               return finding.severity == Severity::Error;
+             });
+  }
+  for (std::size_t place = 0; place < children_.size(); ++place)
+    if (!children_[place]->Validate()) valid_ = 0;
+  return valid_;
+}
+
+void CYbSEKvfBase::SetRevalidateAll() {
+  if (root_) root_->revalidateAll_ = true;
+}
+
+void CYbSEKvfBase::AddError(std::string text, std::string key, std::string detail) {
+  findings_.push_back({Severity::Error, std::move(text), std::move(key), std::move(detail)});
+}
+
+void CYbSEKvfBase::AddWarning(std::string text, std::string key, std::string detail) {
+  findings_.push_back({Severity::Warning, std::move(text), std::move(key), std::move(detail)});
+}
+
+// ---- Root
+
+CYbSEKvfGlobalBase::CYbSEKvfGlobalBase(std::string targetName)
+    : CYbSEKvfBase(nullptr), targetName_(std::move(targetName)) {
+  root_ = this;
+}
+
+CYbSEKvfGlobalBase::~CYbSEKvfGlobalBase() {
+  // Nodes look each other up while they die: from here on nobody is found.
+  importantNodes_.clear();
+  children_.clear();
+}
+
+void CYbSEKvfGlobalBase::RegisterImportantNode(CYbSEKvfBase* node, std::string_view name) {
+  node->isImportant_ = true;
+  importantNodes_[std::string(name)] = node;
+}
+
+CYbSEKvfBase* CYbSEKvfGlobalBase::GetImportantNode(std::string_view name) const {
+  const auto found = importantNodes_.find(std::string(name));
+  return found == importantNodes_.end() ? nullptr : found->second;
+}
+
+void CYbSEKvfGlobalBase::UnregisterImportantNode(std::string_view name) { importantNodes_.erase(std::string(name)); }
+
+void CYbSEKvfGlobalBase::UnregisterNode(const CYbSEKvfBase* node) {
+  std::erase_if(importantNodes_, [node](const auto& entry) { return entry.second == node; });
+}
+
+void CYbSEKvfGlobalBase::Load(KvfNode* parentSection) {
+  LoadChildren(kvfSectionByNameNum(parentSection, targetName_, 1));
+}
+
+void CYbSEKvfGlobalBase::Save(KvfFile* file) {
+  kvfAddTarget(file, targetName_);
+  for (const auto& child : children_) child->Save(file);
+  kvfEndSection(file);
+}
+
+// ---- Walks
+
+namespace {
+
+void WalkBelow(CYbSEKvfBase& node, int depth, bool takesPart, const NodeVisit& visit) {
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
+    const bool childTakesPart = takesPart && child->IsDlgUsedInSetup();
+    visit(*child, depth, childTakesPart);
+    WalkBelow(*child, depth + 1, childTakesPart, visit);
+  }
+}
+
+}  // namespace
+
+void WalkNodes(CYbSEKvfBase& root, const NodeVisit& visit) { WalkBelow(root, 1, root.IsDataUsedInSetup() != 0, visit); }
+
+std::string ClassNameOf(const CYbSEKvfBase& node) {
+  std::string name = os::DemangledName(typeid(node));
+  const std::size_t scope = name.rfind("::");
+  return scope == std::string::npos ? name : name.substr(scope + 2);
+}
+
+// ---- Overview
+
+int CYbSEKvfBase::AddToOverview(std::vector<OverviewLine>& lines, int level) {
+  std::vector<KeyInfo> keys;
+  DescribeKeys(keys);
+  for (const KeyInfo& key : keys)
+    if (key.written) lines.push_back({GetTitle(), level, fmt::format("{} = {}", key.key, key.defaultValue)});
+  return 1;
+}
+
+int GenerateOverview(CYbSEKvfBase& root, std::vector<OverviewLine>& lines) {
+  int result = root.AddToOverview(lines, 0);
+  WalkNodes(root, [&](CYbSEKvfBase& node, int depth, bool takesPart) {
+    if (takesPart && !node.AddToOverview(lines, depth)) result = 0;
+  });
+  return result;
+}
+
+std::string OverviewText(const std::vector<OverviewLine>& lines) {
+  std::string text, lastTitle;
+  for (const OverviewLine& line : lines) {
+    const std::string indent(static_cast<std::size_t>(line.level), ' ');
+    if (line.title != lastTitle) {
+      lastTitle = line.title;
+      text += fmt::format("{}PAGE: {}\r\n", indent, lastTitle);
+    }
+    text += fmt::format("{}      {}\r\n", indent, line.text);
+  }
+  return text;
+}
+
+}  // namespace tervane

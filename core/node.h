@@ -1,0 +1,285 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The tree of nodes: one node owns one section of the setup file. It holds the section's values as plain fields with
+// their defaults, declares their keys, checks them, and says whether it takes part in the setup.
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "core/key_exchange.h"
+#include "core/kvf.h"
+
+namespace tervane {
+
+class CYbSEKvfGlobalBase;
+
+enum class Severity { Error, Warning };
+
+/// What a validation found at a node.
+struct Finding {
+  Severity severity;
+  std::string text;
+  std::string key;     ///< The key that it speaks of; may be empty.
+  std::string detail;  ///< The reason behind a fixed text; may be empty.
+};
+
+/// A line of the overview page.
+struct OverviewLine {
+  std::string title;
+  int level = 0;
+  std::string text;
+};
+
+/// A node. Owns its children; knows its parent, which outlives it.
+class CYbSEKvfBase {
+ public:
+  /// The section name may hold one `%d` for the node's number; empty means that the node works in its parent's section.
+  CYbSEKvfBase(std::string title, std::string sectionName, CYbSEKvfBase* parent);
+  explicit CYbSEKvfBase(CYbSEKvfBase* parent) : CYbSEKvfBase({}, {}, parent) {}
+  virtual ~CYbSEKvfBase();
+  CYbSEKvfBase(const CYbSEKvfBase&) = delete;
+  CYbSEKvfBase& operator=(const CYbSEKvfBase&) = delete;
+
+  // ---- Tree
+
+  /// Makes a child at the end: `NewChild<CSimTitleKvf>()`; the parent is passed as the constructor's last argument.
+  template <class Node, class... Arguments>
+  Node* NewChild(Arguments&&... arguments) {
+    auto node = std::make_unique<Node>(std::forward<Arguments>(arguments)..., this);
+    Node* child = node.get();
+    AddChild(std::move(node));
+    return child;
+  }
+  void AddChild(std::unique_ptr<CYbSEKvfBase> child);
+  /// Takes a child (also a list's item) out of the walk; it stays alive with the caller, who must not keep it longer
+  /// than the tree, and registered. Null when the node is no child.
+  std::unique_ptr<CYbSEKvfBase> RemoveChild(CYbSEKvfBase* child);
+  void SwapChilds(CYbSEKvfBase* a, CYbSEKvfBase* b);
+
+  /// The walk over all children, in a list the plain children first and then the items. The node whose follower has
+  /// been fetched may be removed.
+  CYbSEKvfBase* GetFirstChild() const { return children_.empty() ? nullptr : children_.front().get(); }
+  CYbSEKvfBase* GetNextChild(const CYbSEKvfBase* child) const;
+  /// The children by number from 1; in a list the items alone.
+  virtual CYbSEKvfBase* GetChild(int number) const;
+  virtual int GetChildCount() const { return static_cast<int>(children_.size()); }
+  /// Place of a child from 1, -1 when it is none; in a list the place among the items.
+  virtual int GetNumberWhatIs(const CYbSEKvfBase* child) const;
+
+  /// A second list of nodes, loaded and saved in front of the children.
+  void AddProperty(std::unique_ptr<CYbSEKvfBase> property) { properties_.push_back(std::move(property)); }
+  CYbSEKvfBase* GetProperty(int number) const;
+  int GetPropertyCount() const { return static_cast<int>(properties_.size()); }
+
+  CYbSEKvfBase* GetParent() const { return parent_; }
+  /// The root of the tree; null in a tree without one.
+  CYbSEKvfGlobalBase* GetRoot() const { return root_; }
+  /// The node registered under that name as a `Node`, or null.
+  template <class Node>
+  Node* Important(std::string_view name) const {
+    return dynamic_cast<Node*>(ImportantNode(name));
+  }
+
+  // ---- Section
+
+  virtual const std::string& GetSectionName() const { return sectionName_; }
+  virtual void SetSectionName(std::string name) { sectionName_ = std::move(name); }
+  /// The section name with the node's number in the place of `%d`.
+  std::string FormattedSectionName() const;
+  void SetSectionNumber(int number) { sectionNumber_ = number; }
+  /// The section number when it is set, else the place among the parent's children.
+  virtual int GetNumberWhatAmI() const;
+  virtual int GetSectionUsed() const { return sectionUsed_; }
+  void SetSectionUsed(int used) { sectionUsed_ = used; }
+
+  // ---- Texts
+
+  virtual const std::string& GetTitle() const { return title_; }
+  virtual void SetTitle(std::string title) { title_ = std::move(title); }
+  virtual const std::string& GetAbbreviatedTitle() const { return abbreviatedTitle_; }
+  virtual void SetAbbreviatedTitle(std::string title) { abbreviatedTitle_ = std::move(title); }
+  void SetHelp(std::string helpFile, std::string page);
+  /// The page name given to `SetHelp`.
+  const std::string& GetHtml() const { return helpPage_; }
+  const std::string& GetHelpFile() const { return helpFile_; }
+
+  // ---- File
+
+  /// Reads the node and all below it from its section in the parent's section. Nothing fails: what is missing keeps
+  /// its value.
+  virtual void Load(KvfNode* parentSection);
+  virtual void Save(KvfFile* file);
+  virtual void ReadData(KvfNode* section);
+  virtual void WriteData(KvfFile* file);
+  /// Adds what the node's declaration tells of its keys.
+  void DescribeKeys(std::vector<KeyInfo>& keys);
+  /// A list reads and writes its item count here.
+  virtual void LoadSize(KvfNode* /*section*/) {}
+  virtual void SaveSize(KvfFile* /*file*/) {}
+
+  void ReadTouched(KvfNode* section);
+  void Touch() { touched_ = 1; }
+  void TouchAllChildren();
+  int GetHasBeenTouched() const { return touched_; }
+
+  // ---- Taking part and validation
+
+  /// The node's own answer, from the model components.
+  virtual int IsDlgUsedInSetup() { return 1; }
+  /// Whether the node takes part: its own answer and that of all nodes above it. Written to the file.
+  virtual int IsDataUsedInSetup();
+
+  /// Clears and makes the findings of this node and of all below it; nodes that take no part have none. Non-zero when
+  /// no error stands.
+  virtual int Validate();
+  /// The node's own checks; 0 when the node is not valid.
+  virtual int ValidateData() { return 1; }
+  /// Result of the latest validation, also of the nodes below.
+  int Valid() const { return valid_; }
+  const std::vector<Finding>& Findings() const { return findings_; }
+  void ReValidate() { Validate(); }
+  /// Asks for a validation of the whole tree at the next update.
+  void SetRevalidateAll();
+
+  /// Adds the node's lines to the overview: one for each key.
+  virtual int AddToOverview(std::vector<OverviewLine>& lines, int level);
+
+  /// Reset hook of list items.
+  virtual void SetDefault() {}
+
+ protected:
+  /// The keys of the node in the order of the file.
+  virtual void ExchangeKeys(KeyExchange& /*keys*/) {}
+
+  void AddError(std::string text, std::string key = {}, std::string detail = {});
+  void AddWarning(std::string text, std::string key = {}, std::string detail = {});
+
+  void SectionName(std::string name) { sectionName_ = std::move(name); }
+  /// The node's section in the parent's section, marked as looked up; null when there is none.
+  KvfNode* FindSection(KvfNode* parentSection) const;
+  void LoadChildren(KvfNode* section);
+  CYbSEKvfBase* ImportantNode(std::string_view name) const;
+
+  // For lists, whose items stand behind the plain children.
+  std::vector<std::unique_ptr<CYbSEKvfBase>> children_;
+  std::size_t plainChildren_ = 0;
+  /// Place of a child in `children_`, or -1.
+  std::ptrdiff_t PlaceOf(const CYbSEKvfBase* child) const;
+  bool HadSection(const CYbSEKvfBase& child) const { return child.hadSection_; }
+
+ private:
+  friend class CYbSEKvfGlobalBase;
+
+  CYbSEKvfBase* parent_;
+  CYbSEKvfGlobalBase* root_;
+  std::vector<std::unique_ptr<CYbSEKvfBase>> properties_;
+  std::string title_, abbreviatedTitle_, sectionName_, helpFile_, helpPage_;
+  std::vector<Finding> findings_;
+  int touched_ = 0;
+  int sectionNumber_ = -1;
+  int sectionUsed_ = 1;
+  int sectionInstance_ = 1;   ///< Which of several like sections of the parent is this node's.
+  bool hadSection_ = false;   ///< The latest load found the section.
+  bool isImportant_ = false;  ///< Registered at the root at least once.
+  int valid_ = 1;
+  mutable std::uint32_t placeHint_ = 0;  ///< Place among the siblings when last asked; checked before use.
+};
+
+/// A node that is meant to hold further nodes.
+class CYbSEKvfGroupBase : public CYbSEKvfBase {
+ public:
+  using CYbSEKvfBase::CYbSEKvfBase;
+};
+
+class CTvnKvfGroupBase : public CYbSEKvfGroupBase {
+ public:
+  using CYbSEKvfGroupBase::CYbSEKvfGroupBase;
+};
+
+class CTvnKvfBase : public CYbSEKvfBase {
+ public:
+  using CYbSEKvfBase::CYbSEKvfBase;
+};
+
+/// The root of a tree: the target of the file, and the table by which nodes find each other.
+class CYbSEKvfGlobalBase : public CYbSEKvfBase {
+ public:
+  explicit CYbSEKvfGlobalBase(std::string targetName);
+  ~CYbSEKvfGlobalBase() override;
+
+  const std::string& GetTargetName() const { return targetName_; }
+  void RegisterImportantNode(CYbSEKvfBase* node, std::string_view name);
+  /// The node under that name, or null.
+  CYbSEKvfBase* GetImportantNode(std::string_view name) const;
+  void UnregisterImportantNode(std::string_view name);
+  /// Takes out all names of a node, before it dies.
+  void UnregisterNode(const CYbSEKvfBase* node);
+
+  /// Whether `IsDataUsedInSetup` is written into every section.
+  virtual int WriteUsedFlags() { return 0; }
+  /// Version of the document that was read; -1 when its file holds none or nothing was read.
+  virtual int ReadDocVersion() const { return -1; }
+
+  /// Reads the children from the target; `parentSection` is the file's top level.
+  void Load(KvfNode* parentSection) override;
+  void Save(KvfFile* file) override;
+
+  /// True once after `SetRevalidateAll`.
+  bool TakeRevalidateAll() { return std::exchange(revalidateAll_, false); }
+
+ private:
+  friend class CYbSEKvfBase;
+
+  std::string targetName_;
+  std::unordered_map<std::string, CYbSEKvfBase*> importantNodes_;
+  bool revalidateAll_ = false;
+};
+
+/// A rectangle of map coordinates; undefined when all four are exactly 0.
+struct DataArea {
+  double x0 = 0, y0 = 0, x1 = 0, y1 = 0;
+
+  bool IsUndefined() const { return x0 == 0.0 && y0 == 0.0 && x1 == 0.0 && y1 == 0.0; }
+  bool operator==(const DataArea&) const = default;
+};
+
+/// A root that knows the area that maps show.
+class CTvnKvfGlobalBase : public CYbSEKvfGlobalBase {
+ public:
+  using CYbSEKvfGlobalBase::CYbSEKvfGlobalBase;
+
+  /// The largest area; non-zero when it changed.
+  int SetMaxDataArea(const DataArea& area) {
+    const bool changed = !(area == maxArea_);
+    maxArea_ = area;
+    return changed;
+  }
+  void SetDefaultDataArea(const DataArea& area) { defaultArea_ = area; }
+  const DataArea& GetMaxDataArea() const { return maxArea_; }
+  const DataArea& GetDefaultDataArea() const { return defaultArea_; }
+  /// Sets `undefined` to whether the default area is undefined.
+  void IsUndefined(int& undefined) const { undefined = defaultArea_.IsUndefined(); }
+
+ private:
+  DataArea maxArea_, defaultArea_;
+};
+
+/// Calls `visit(node, depth, takesPart)` for all nodes below the root, parents first, in the order of the walk.
+using NodeVisit = std::function<void(CYbSEKvfBase& node, int depth, bool takesPart)>;
+void WalkNodes(CYbSEKvfBase& root, const NodeVisit& visit);
+
+/// The overview of a tree: the lines of all nodes that take part. 0 on failure.
+int GenerateOverview(CYbSEKvfBase& root, std::vector<OverviewLine>& lines);
+/// The lines as the text of the overview page.
+std::string OverviewText(const std::vector<OverviewLine>& lines);
+
+/// Name of the node's class.
+std::string ClassNameOf(const CYbSEKvfBase& node);
+
+}  // namespace tervane

@@ -1,0 +1,42 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "core/document.h"
+#include "document/global.h"
+
+namespace tervane {
+
+/// The document of the flow model editor: a setup with its tree, and the names of the files that lie beside it.
+class CFlowModelDoc : public CYbSEDocument {
+ public:
+  CFlowModelDoc();
+
+  CGlobal& Global() const { return static_cast<CGlobal&>(Root()); }
+  static constexpr std::string_view kEditorName = "Flow Model";
+
+  // ---- Files in the result folder, written with `\\` behind the folder as the engines expect them
+
+  std::string PreprocessorReport() const { return ResultFile("_PreProcessed", ".kvf"); }
+  std::string PreprocessedRiverData() const { return ResultFile("_PreProcessed_River", ".bin"); }
+  std::string SimulationCatalogue() const { return ResultFile("", ".tvdres"); }
+  std::string WaterQualityCatalogue() const { return ResultFile("", ".TvdWQres"); }
+  std::string GridSeriesIndex() const { return ResultFile("", ".fif"); }
+  std::string DetailedTimeSeriesPage() const { return ResultFile("DetailedTS", ".HTML"); }
+  std::string DetailedRiverTimeSeriesPage() const { return ResultFile("DetailedFvrTS", ".HTML"); }
+
+ protected:
+  void OnLoaded() override;
+
+ private:
+  std::string ResultFile(std::string_view stemEnd, std::string_view extension) const;
+};
+
+/// Folder, stem and extension as one name: blanks around the folder are dropped, its `/` become `\\`, one `\\` stands
+/// between folder and stem, and the extension has one dot before it; an empty extension adds nothing.
+std::string ResultFileName(std::string_view folder, std::string_view stem, std::string_view extension);
+
+}  // namespace tervane

@@ -1,0 +1,29 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <memory>
+#include <vector>
+
+#include "core/node.h"
+
+namespace tervane {
+
+/// The root of a setup: makes the whole tree, fixes the order in which its sections are read, and carries old files
+/// over.
+class CGlobal : public CTvnKvfGlobalBase {
+ public:
+  CGlobal();
+
+  int WriteUsedFlags() override { return 1; }
+  int ReadDocVersion() const override;
+  int AddToOverview(std::vector<OverviewLine>& /*lines*/, int /*level*/) override { return 1; }
+
+  void Load(KvfNode* parentSection) override;
+
+ private:
+  /// Alive and registered, but no part of the walk any more: read from old files, never written.
+  std::vector<std::unique_ptr<CYbSEKvfBase>> retired_;
+};
+
+}  // namespace tervane

@@ -1,0 +1,37 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "document/view_settings.h"
+
+#include <string>
+
+namespace tervane {
+
+namespace {
+
+/// True when an area was read: the flag of the file says that it is defined. Otherwise the four keys are skipped.
+bool ExchangeArea(KeyExchange& keys, const std::string& name, DataArea& area) {
+  int undefined = keys.IsReading() ? 1 : area.IsUndefined();
+  keys(name + "Undefined", undefined);
+  DataArea read;
+  DataArea& target = keys.IsReading() ? read : area;
+  keys(name + "_X0", target.x0);
+  keys(name + "_Y0", target.y0);
+  keys(name + "_X1", target.x1);
+  keys(name + "_Y1", target.y1);
+  if (!keys.IsReading() || undefined != 0) return false;
+  area = read;
+  return true;
+}
+
+}  // namespace
+
+void CViewSettingsKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("ShowValidationIcons", ShowValidationIcons);
+  auto* root = dynamic_cast<CTvnKvfGlobalBase*>(GetRoot());
+  DataArea defaultArea = root ? root->GetDefaultDataArea() : DataArea();
+  if (ExchangeArea(keys, "DefaultZoomDataArea", defaultArea) && root) root->SetDefaultDataArea(defaultArea);
+  DataArea maxArea = root ? root->GetMaxDataArea() : DataArea();
+  if (ExchangeArea(keys, "MaxZoomDataArea", maxArea) && root) root->SetMaxDataArea(maxArea);
+}
+
+}  // namespace tervane

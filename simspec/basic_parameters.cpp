@@ -1,0 +1,35 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "simspec/basic_parameters.h"
+
+#include "simspec/air_flow.h"
+#include "simspec/control_parameters.h"
+#include "simspec/model_components.h"
+#include "simspec/periods.h"
+#include "simspec/time_step_control.h"
+#include "simspec/titles.h"
+
+namespace tervane {
+
+CBasicParaKvf::CBasicParaKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Simulation specification", "SimSpec", parent) {
+  CYbSEKvfGlobalBase& root = *GetRoot();
+  root.RegisterImportantNode(this, "BASICPARAMETERS");
+  root.RegisterImportantNode(NewChild<CModelCompKvf>(), "MODELCOMP");
+  root.RegisterImportantNode(NewChild<CModModelCompKvf>(), "MODMODELCOMP");
+  NewChild<CSimTitleKvf>();
+  root.RegisterImportantNode(NewChild<CSimPeriodKvf>(), "SIMPERIOD");
+  NewChild<CCompControlParaTimeStepKvf>();
+  root.RegisterImportantNode(NewChild<CCompControlParaOLKvf>(), "COMPCONTROLPARAOL");
+  NewChild<CCompControlParaUZKvf>();
+  NewChild<CCompControlParaSZKvf>();
+  NewChild<CAirFlowModKvf>();
+}
+
+void CBasicParaKvf::ReadData(KvfNode* section) {
+  CTvnKvfBase::ReadData(section);
+  // In files of version 1 the storing of results lies inside this section.
+  if (GetRoot()->ReadDocVersion() == 1)
+    if (CYbSEKvfBase* storing = GetRoot()->GetImportantNode("STORINGRESULTS")) storing->Load(section);
+}
+
+}  // namespace tervane

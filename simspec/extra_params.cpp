@@ -1,0 +1,52 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "simspec/extra_params.h"
+
+#include "platform/paths.h"
+#include "simspec/basic_parameters.h"
+
+namespace tervane {
+
+void CExtraParamsItemKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("Name", Name);
+  keys("Type", Type);
+  const auto exchangeValue = [&](int kind) {
+    switch (kind) {
+      case kFloat:
+        keys("Value", FloatValue);
+        break;
+      case kInteger:
+        keys("Value", IntegerValue);
+        break;
+      case kBool:
+        keys("Value", BoolValue);
+        break;
+      case kText:
+        keys("Value", TextValue);
+        break;
+      case kFilename:
+        keys("Value", FilenameValue);
+        break;
+      default:
+        break;
+    }
+  };
+  if (keys.IsDescribing())
+    for (const int kind : {kFloat, kInteger, kBool, kText, kFilename}) exchangeValue(kind);
+  else
+    exchangeValue(Type);
+  // A folder is no file.
+  if (keys.IsReading() && EndsInSeparator(FilenameValue.Text())) FilenameValue = FileName();
+}
+
+int CExtraParamsKvf::GetSectionUsed() const {
+  const auto* basics = Important<CBasicParaKvf>("BASICPARAMETERS");
+  return basics ? basics->UsesExtraParams : 1;
+}
+
+std::string CExtraParamsKvf::GetItemName(int number) const {
+  const CExtraParamsItemKvf* item = GetItem(number);
+  return item ? item->Name : std::string();
+}
+
+}  // namespace tervane

@@ -1,0 +1,179 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "simspec/model_components.h"
+
+#include <array>
+#include <utility>
+
+#include <fmt/format.h>
+
+#include "simspec/basic_parameters.h"
+#include "simspec/control_parameters.h"
+#include "simspec/periods.h"
+#include "simspec/time_step_control.h"
+#include "simspec/titles.h"
+
+namespace tervane {
+
+int EngineOf(const CYbSEKvfBase& node) {
+  const auto* basics = node.Important<CBasicParaKvf>("BASICPARAMETERS");
+  return basics ? basics->ModelType : kEngineTervane;
+}
+
+const CModelCompKvf& ModelCompOf(const CYbSEKvfBase& node) {
+  static const CModelCompKvf ofNewSetup(nullptr);
+  const auto* components = node.Important<CModelCompKvf>("MODELCOMP");
+  return components ? *components : ofNewSetup;
+}
+
+CModModelCompKvf& ModModelCompOf(const CYbSEKvfBase& node) {
+  static CModModelCompKvf ofNewSetup(nullptr);
+  auto* components = node.Important<CModModelCompKvf>("MODMODELCOMP");
+  return components ? *components : ofNewSetup;
+}
+
+bool UsesModflow(const CYbSEKvfBase& node) {
+  const int engine = EngineOf(node);
+  return engine >= kEngineModflowSurfact && engine <= kEngineModflow2000;
+}
+
+// ---- CModelCompKvf
+
+int CModelCompKvf::IsDlgUsedInSetup() { return EngineOf(*this) == kEngineTervane; }
+
+void CModelCompKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("ET", ET);
+  keys("OL", OL);
+  keys("SZ", SZ);
+  keys("UZ", UZ);
+  keys("WM", WM);
+  keys("River", River);
+  keys("WQ", WQ);
+  keys("ADPTRadio", ADPTRadio);
+  keys("UZ_ModelType", UZ_ModelType);
+  keys("SZ_ModelType", SZ_ModelType);
+  keys("OL_ModelType", OL_ModelType);
+  keys("UseCurrentWmSimulation", UseCurrentWmSimulation);
+  keys("FilenameTvdRes", FilenameTvdRes);
+}
+
+int CModelCompKvf::AddToOverview(std::vector<OverviewLine>& lines, int level) {
+  const std::array<std::pair<const char*, int>, 10> values{{{"ET", ET},
+                                                            {"OL", OL},
+                                                            {"SZ", SZ},
+                                                            {"UZ", UZ},
+                                                            {"WM", WM},
+                                                            {"River", River},
+                                                            {"WQ", WQ},
+                                                            {"UZ_ModelType", UZ_ModelType},
+                                                            {"SZ_ModelType", SZ_ModelType},
+                                                            {"OL_ModelType", OL_ModelType}}};
+  for (const auto& [name, value] : values) lines.push_back({GetTitle(), level, fmt::format("{} = {}", name, value)});
+  return 1;
+}
+
+// ---- CModModelCompKvf
+
+int CModModelCompKvf::IsDlgUsedInSetup() { return EngineOf(*this) == kEngineModflowSurfact; }
+
+int CModModelCompKvf::GetSubsurfaceModelType() {
+  VariablySaturated = subsurfaceModelType_ > 1;
+  const int engine = EngineOf(*this);
+  if (engine == kEngineModflowSurfact && VariablySaturated)
+    subsurfaceModelType_ = WithAirFlow ? 3 : 2;
+  else if (UsesModflow(*this))
+    subsurfaceModelType_ = WithCellRewetting ? 1 : 0;
+  return subsurfaceModelType_;
+}
+
+void CModModelCompKvf::TakeSubsurfaceModelType(int type) {
+  if (type == 0 || type == 1) WithCellRewetting = type;
+  if (type == 2 || type == 3) WithAirFlow = type == 3;
+  subsurfaceModelType_ = type;
+}
+
+void CModModelCompKvf::ExchangeKeys(KeyExchange& keys) {
+  const int engine = keys.IsWriting() ? EngineOf(*this) : kEngineTervane;
+  const bool knowsRechargeType = engine != kEngineModflow96 && engine != kEngineModflow2000;
+
+  keys("OL", OL);
+  keys("River", River);
+  keys("RiverModelType", RiverModelType);
+  keys("Recharge", Recharge);
+  // The held value stays for a return to the engine that knows it.
+  keys.Custom(
+      "Recharge_ModelType", [&] { return knowsRechargeType ? Recharge_ModelType : 0; },
+      [&](int type) { Recharge_ModelType = type; });
+  keys("Subsurface", Subsurface);
+  keys.Custom(
+      "Subsurface_ModelType", [&] { return keys.IsReading() ? subsurfaceModelType_ : GetSubsurfaceModelType(); },
+      [&](int type) { TakeSubsurfaceModelType(type); });
+  keys("Modflow2000_BCFType", Modflow2000_BCFType);
+  keys("ET", ET);
+}
+
+// ---- CModelCompWQKvf
+
+namespace {
+
+/// Both kinds of water quality simulation need the own engine and a compartment with water in it.
+bool HasWaterQuality(const CYbSEKvfBase& node, int adPtRadio) {
+  const CModelCompKvf& components = ModelCompOf(node);
+  return EngineOf(node) == kEngineTervane && components.WQ && components.ADPTRadio == adPtRadio &&
+         (components.OL || components.UZ || components.SZ);
+}
+
+}  // namespace
+
+CModelCompWQKvf::CModelCompWQKvf(CYbSEKvfBase* parent)
+    : CTvnKvfBase("Water Quality Simulation Specification", "ModelCompWQ", parent) {
+  SetAbbreviatedTitle("WQ Simulation Specification");
+  NewChild<CSimTitleWQKvf>();
+  NewChild<CSimPeriodWQKvf>();
+  NewChild<CCompControlParaTimeStepWQKvf>();
+  NewChild<CCompControlParaColloidWQKvf>();
+}
+
+int CModelCompWQKvf::IsDlgUsedInSetup() { return HasWaterQuality(*this, 0); }
+
+int CModelCompWQKvf::ValidateData() {
+  const CModelCompKvf& components = ModelCompOf(*this);
+  if (components.UZ && components.UZ_ModelType == 2 && UZ)
+    AddError("UZ Water Quality is only allowed for the Richards Equation and Gravity flow methods.", "UZ");
+  return 1;
+}
+
+void CModelCompWQKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("OL", OL);
+  keys("River", River);
+  keys("UZ", UZ);
+  keys("PlantUptake", PlantUptake);
+  keys("SZ", SZ);
+  keys("IncludeProcesses", IncludeProcesses);
+  keys("ProcessType", ProcessType);
+}
+
+// ---- CModelCompPTKvf
+
+CModelCompPTKvf::CModelCompPTKvf(CYbSEKvfBase* parent)
+    : CTvnKvfBase("Particle Tracking Specification", "ModelCompPT", parent) {
+  SetAbbreviatedTitle("PT Simulation Specification");
+  NewChild<CSimTitlePTKvf>();
+  NewChild<CSimPeriodPTKvf>();
+  NewChild<CCompControlParaPTKvf>();
+}
+
+int CModelCompPTKvf::IsDlgUsedInSetup() { return HasWaterQuality(*this, 1); }
+
+void CModelCompPTKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("InitDensityRadio", InitDensityRadio);
+  keys("ParticleMass", ParticleMass);
+  keys("InitLocationRadio", InitLocationRadio);
+  keys("DistanceFracFromBottom", DistanceFracFromBottom);
+  keys("AvoidInitParticlesInFixedCells", AvoidInitParticlesInFixedCells);
+  keys("AvoidInitParticlesAboveWaterTable", AvoidInitParticlesAboveWaterTable);
+  keys("RegistrationZoneRadio", RegistrationZoneRadio);
+  keys("AutomaticWellRegistration", AutomaticWellRegistration);
+}
+
+}  // namespace tervane
