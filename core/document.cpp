@@ -70,7 +70,8 @@ bool CYbSEDocument::LoadTree(KvfFile* file, const std::string& path) {
     report_.entries.push_back(
         {LoadReport::Kind::Note, note.line, std::move(note.path), std::move(note.key), std::move(note.text)});
   report_.unread = CollectUnread(*file);
-  keepOriginal_ = !report_.unread.empty() || root_->ReadDocVersion() != CFlowModelDocVersionKvf::kWrittenVersion;
+  original_.version = root_->ReadDocVersion();
+  original_.mustBeKept = !report_.unread.empty() || original_.version != CFlowModelDocVersionKvf::kWrittenVersion;
   OnLoaded();
   modified_ = false;
   return true;
@@ -92,7 +93,7 @@ bool CYbSEDocument::BuildText(const std::string& folder, std::string& text, std:
 }
 
 bool CYbSEDocument::KeepOriginal() {
-  const int version = root_->ReadDocVersion();
+  const int version = original_.version;
   const std::string folder(FolderOf(path_));
   const std::string stem = fmt::format("{}{}{}.v{}", folder, folder.empty() || EndsInSeparator(folder) ? "" : "/",
                                        BaseNameOf(path_), version < 0 ? "none" : std::to_string(version));
@@ -113,7 +114,7 @@ bool CYbSEDocument::OnSaveDocument(const std::string& path) {
     error_ = fmt::format("cannot write {}: {}", path, reason);
     return false;
   }
-  const bool overwritesOriginal = keepOriginal_ && (path == path_ || IsSameFile(path, path_));
+  const bool overwritesOriginal = original_.mustBeKept && (path == path_ || IsSameFile(path, path_));
   if (overwritesOriginal && !KeepOriginal()) return false;
   const FileResult result = WriteFileAtomically(path, text);
   if (!result.Ok()) {
@@ -121,7 +122,7 @@ bool CYbSEDocument::OnSaveDocument(const std::string& path) {
     return false;
   }
   if (!result.note.empty()) saveNotes_.push_back(result.note);
-  if (overwritesOriginal) keepOriginal_ = false;
+  if (overwritesOriginal) original_.mustBeKept = false;
   path_ = path;
   modified_ = false;
   return true;

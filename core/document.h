@@ -50,6 +50,12 @@ class CYbSEDocument {
   /// holds what nothing reads or was written by an older version. False when it failed; the old file then stands.
   virtual bool OnSaveDocument(const std::string& path);
   const std::string& Error() const { return error_; }
+  /// This document holds a changed copy of `other`, and will be saved in its place.
+  void Continue(const CYbSEDocument& other) {
+    path_ = other.path_;
+    header_ = other.header_;
+    original_ = other.original_;
+  }
   /// What the user should know of the latest save: where the original was kept, a hard link.
   const std::vector<std::string>& SaveNotes() const { return saveNotes_; }
 
@@ -82,7 +88,13 @@ class CYbSEDocument {
   LoadReport report_;
   std::vector<std::string> saveNotes_;
   bool modified_ = false;
-  bool keepOriginal_ = false;  ///< The file that was read holds what the next save will not.
+
+  /// The file that was read.
+  struct Original {
+    int version = -1;
+    bool mustBeKept = false;  ///< It holds what the next save will not.
+  };
+  Original original_;
 };
 
 }  // namespace tervane

@@ -256,17 +256,40 @@ void CYbSEKvfGlobalBase::Save(KvfFile* file) {
 
 namespace {
 
-void WalkBelow(CYbSEKvfBase& node, int depth, bool takesPart, const NodeVisit& visit) {
+void WalkBelow(CYbSEKvfBase& node, const std::string& path, int depth, bool takesPart,
+               const std::function<void(const NodePlace&)>& visit) {
+  std::unordered_map<std::string, int> instances;
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
-    const bool childTakesPart = takesPart && child->IsDlgUsedInSetup();
-    visit(*child, depth, childTakesPart);
-    WalkBelow(*child, depth + 1, childTakesPart, visit);
+    const std::string name = StepName(*child);
+    const NodePlace place{*child, JoinPath(path, PathName(name, ++instances[name])), depth,
+                          takesPart && child->IsDlgUsedInSetup()};
+    visit(place);
+    WalkBelow(*child, place.path, depth + 1, place.takesPart, visit);
   }
 }
 
 }  // namespace
 
-void WalkNodes(CYbSEKvfBase& root, const NodeVisit& visit) { WalkBelow(root, 1, root.IsDataUsedInSetup() != 0, visit); }
+void WalkNodes(CYbSEKvfBase& root, const std::function<void(const NodePlace&)>& visit) {
+  WalkBelow(root, {}, 1, root.IsDataUsedInSetup() != 0, visit);
+}
+
+std::string StepName(const CYbSEKvfBase& node) {
+  return node.GetSectionName().empty() ? ClassNameOf(node) : node.FormattedSectionName();
+}
+
+CYbSEKvfBase* FindChild(const CYbSEKvfBase& parent, const PathStep& step) {
+  int instance = 0;
+  for (CYbSEKvfBase* child = parent.GetFirstChild(); child; child = parent.GetNextChild(child))
+    if (StepName(*child) == step.name && ++instance == step.instance) return child;
+  return nullptr;
+}
+
+CYbSEKvfBase* FindNode(CYbSEKvfBase& root, const std::vector<PathStep>& steps) {
+  CYbSEKvfBase* node = &root;
+  for (const PathStep& step : steps) node = node ? FindChild(*node, step) : nullptr;
+  return node;
+}
 
 std::string ClassNameOf(const CYbSEKvfBase& node) {
   std::string name = os::DemangledName(typeid(node));
@@ -286,8 +309,8 @@ int CYbSEKvfBase::AddToOverview(std::vector<OverviewLine>& lines, int level) {
 
 int GenerateOverview(CYbSEKvfBase& root, std::vector<OverviewLine>& lines) {
   int result = root.AddToOverview(lines, 0);
-  WalkNodes(root, [&](CYbSEKvfBase& node, int depth, bool takesPart) {
-    if (takesPart && !node.AddToOverview(lines, depth)) result = 0;
+  WalkNodes(root, [&](const NodePlace& place) {
+    if (place.takesPart && !place.node.AddToOverview(lines, place.depth)) result = 0;
   });
   return result;
 }

@@ -14,6 +14,7 @@
 
 #include "core/key_exchange.h"
 #include "core/kvf.h"
+#include "core/path.h"
 
 namespace tervane {
 
@@ -270,9 +271,22 @@ class CTvnKvfGlobalBase : public CYbSEKvfGlobalBase {
   DataArea maxArea_, defaultArea_;
 };
 
-/// Calls `visit(node, depth, takesPart)` for all nodes below the root, parents first, in the order of the walk.
-using NodeVisit = std::function<void(CYbSEKvfBase& node, int depth, bool takesPart)>;
-void WalkNodes(CYbSEKvfBase& root, const NodeVisit& visit);
+/// A node as a walk meets it.
+struct NodePlace {
+  CYbSEKvfBase& node;
+  std::string path;  ///< As every program and message writes it; a node without a section goes by its class name.
+  int depth;         ///< 1 for the children of the root.
+  bool takesPart;    ///< Together with all nodes above it.
+};
+/// Visits all nodes below the root, parents first, in the order of the walk.
+void WalkNodes(CYbSEKvfBase& root, const std::function<void(const NodePlace&)>& visit);
+
+/// The child that a step of a path names, or null.
+CYbSEKvfBase* FindChild(const CYbSEKvfBase& parent, const PathStep& step);
+/// The node at the end of the steps, or null; no steps lead to the root itself.
+CYbSEKvfBase* FindNode(CYbSEKvfBase& root, const std::vector<PathStep>& steps);
+/// The node's name in a path, without an instance number.
+std::string StepName(const CYbSEKvfBase& node);
 
 /// The overview of a tree: the lines of all nodes that take part. 0 on failure.
 int GenerateOverview(CYbSEKvfBase& root, std::vector<OverviewLine>& lines);

@@ -59,7 +59,6 @@ bool ReadHotStartData(KvfFile* file, HotStartData& data) {
   kvfGetParam(kvfSectionByNameNum(general, "version", 1), "VersionNumber", &version, 1, 1);
   if (version < firstVersionWithHotStart) return false;
   KvfNode* period = kvfSectionByNameNum(target, "OutputPeriodAndMaxTimestep", 1);
-  if (!period) period = kvfSectionByNameNum(general, "OutputPeriodAndMaxTimestep", 1);
   kvfGetParam(period, "HotStartData", &hasData, 1, 1);
   if (hasData != 1) return false;
   kvfGetParam(period, "HotstartStoringTimestep_Hrs", &hours, 1, 1);

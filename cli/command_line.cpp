@@ -1,0 +1,116 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "cli/command_line.h"
+
+#include <algorithm>
+
+#include <CLI/CLI.hpp>
+
+#include "cli/commands.h"
+#include "cli/completion.h"
+
+namespace tervane {
+
+namespace {
+
+/// What the user typed.
+struct Typed {
+  std::string file, secondFile, path, value;
+  bool all = false, force = false, json = false, markdown = false, paths = false;
+};
+
+}  // namespace
+
+int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out, std::ostream& err) {
+  CLI::App app{"Checks, shows and changes setups of the integrated catchment model Tervane.", "tervane"};
+  app.footer(
+      "A PATH is section names joined by /, with #n behind a name for the n-th of equal names and :KEY for a key:\n"
+      "SimSpec/SimTitle:Title. Exit status: 0 done, 1 findings or differences, 2 could not.");
+  app.require_subcommand(1);
+  app.set_version_flag("--version", "tervane 0.1.0");
+
+  Typed typed;
+  const Streams streams{out, err};
+  int status = kDone;
+  const auto command = [&](const char* name, const char* description, auto run) {
+    CLI::App* subcommand = app.add_subcommand(name, description);
+    subcommand->callback([&status, run] { status = run(); });
+    return subcommand;
+  };
+  const auto withFile = [&](CLI::App* subcommand) {
+    subcommand->add_option("FILE", typed.file, "The setup (.tvd)")->required();
+    return subcommand;
+  };
+  const auto withPath = [&](CLI::App* subcommand, const char* description) {
+    return subcommand->add_option("PATH", typed.path, description);
+  };
+
+  CLI::App* create = withFile(
+      command("new", "Write a setup with all defaults", [&] { return NewCommand(typed.file, typed.force, streams); }));
+  create->add_flag("--force", typed.force, "Replace a file that exists");
+
+  CLI::App* check = withFile(command("check", "List errors, warnings, notes and what the file holds that nothing reads",
+                                     [&] { return CheckCommand(typed.file, typed.json, streams); }));
+  check->add_flag("--json", typed.json, "As JSON");
+
+  CLI::App* tree = withFile(command("tree", "List the nodes that take part", [&] {
+    const TreeForm form = typed.json ? TreeForm::Json : typed.paths ? TreeForm::Paths : TreeForm::Text;
+    return TreeCommand(typed.file, typed.all, form, streams);
+  }));
+  tree->add_flag("--all", typed.all, "Also the nodes that take no part");
+  tree->add_flag("--paths", typed.paths, "One PATH a line");
+  tree->add_flag("--json", typed.json, "As JSON");
+
+  withPath(withFile(command("show", "Show nodes with their keys, as they would be saved",
+                            [&] { return ShowCommand(typed.file, typed.path, streams); })),
+           "The node; without it the whole setup");
+
+  withPath(withFile(command("get", "Print the value of a key, as it would be saved",
+                            [&] { return GetCommand(typed.file, typed.path, streams); })),
+           "The key, as SECTION/SECTION:KEY")
+      ->required();
+
+  CLI::App* set = withFile(command("set", "Change the value of a key and save the setup",
+                                   [&] { return SetCommand(typed.file, typed.path, typed.value, streams); }));
+  withPath(set, "The key, as SECTION/SECTION:KEY")->required();
+  set->add_option("VALUE", typed.value, "The value; several separated by commas; dates also as 2000-01-31 12:00")
+      ->required();
+
+  CLI::App* convert = command("convert", "Write a setup of any version as one of the present version",
+                              [&] { return ConvertCommand(typed.file, typed.secondFile, typed.force, streams); });
+  convert->add_option("IN", typed.file, "The setup to read")->required();
+  convert->add_option("OUT", typed.secondFile, "The setup to write; when it is IN, the original is kept beside it")
+      ->required();
+  convert->add_flag("--force", typed.force, "Replace another file that exists");
+
+  CLI::App* diff = command("diff", "Compare two setups by section and key",
+                           [&] { return DiffCommand(typed.file, typed.secondFile, typed.json, streams); });
+  diff->add_option("A", typed.file, "The old setup")->required();
+  diff->add_option("B", typed.secondFile, "The new setup")->required();
+  diff->add_flag("--json", typed.json, "As JSON");
+
+  command("keys", "List all keys with place, type and default", [&] {
+    return KeysCommand(typed.markdown, streams);
+  })->add_flag("--markdown", typed.markdown, "As a page of the manual");
+
+  command("completion", "Print the completion script for bash; use: source <(tervane completion)", [&] {
+    out << BashCompletion(app);
+    return kDone;
+  });
+
+  try {
+    // CLI11 takes the arguments from the back.
+    std::vector<std::string> reversed(arguments.rbegin(), arguments.rend());
+    app.parse(reversed);
+  } catch (const CLI::ParseError& error) {
+    return app.exit(error, out, err) == 0 ? kDone : kCouldNot;
+  }
+  out.flush();
+  if (!out) {
+    err << "the results could not be written\n";
+    return kCouldNot;
+  }
+  return status;
+}
+
+}  // namespace tervane

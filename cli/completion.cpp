@@ -1,0 +1,51 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "cli/completion.h"
+
+#include <CLI/CLI.hpp>
+#include <fmt/format.h>
+
+namespace tervane {
+
+namespace {
+
+std::string OptionNames(const CLI::App& app) {
+  std::string names;
+  for (const CLI::Option* option : app.get_options())
+    for (const std::string& name : option->get_lnames()) names += fmt::format(" --{}", name);
+  return names;
+}
+
+}  // namespace
+
+std::string BashCompletion(const CLI::App& app) {
+  std::string commands, cases;
+  for (const CLI::App* command : app.get_subcommands({})) {
+    commands += " " + command->get_name();
+    cases += fmt::format("    {}) options=\"{}\" ;;\n", command->get_name(), OptionNames(*command).substr(1));
+  }
+  return fmt::format(R"bash(# bash completion of tervane: source <(tervane completion)
+_tervane() {{
+  local current="${{COMP_WORDS[COMP_CWORD]}}" command="${{COMP_WORDS[1]}}" options=""
+  COMPREPLY=()
+  if ((COMP_CWORD == 1)); then
+    mapfile -t COMPREPLY < <(compgen -W "{}{}" -- "$current")
+    return
+  fi
+  case "$command" in
+{}  esac
+  if [[ "$current" == -* ]]; then
+    mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
+  elif ((COMP_CWORD == 3)) && [[ "$command" =~ ^(show|get|set)$ ]]; then
+    local IFS=$'\n'
+    mapfile -t COMPREPLY < <(compgen -W "$(tervane tree "${{COMP_WORDS[2]}}" --all --paths 2>/dev/null)" -- "$current")
+  else
+    mapfile -t COMPREPLY < <(compgen -f -- "$current")
+  fi
+}}
+complete -o filenames -F _tervane tervane
+)bash",
+                     commands.substr(1), OptionNames(app), cases);
+}
+
+}  // namespace tervane

@@ -1,0 +1,83 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <vector>
+
+#include <fmt/format.h>
+#include <fmt/ostream.h>
+
+#include "cli/command_line.h"
+#include "cli/commands.h"
+#include "cli/json.h"
+#include "cli/setup_file.h"
+#include "document/setup_diff.h"
+
+namespace tervane {
+
+namespace {
+
+std::string_view KindName(SetupDifference::Kind kind) {
+  switch (kind) {
+    case SetupDifference::Kind::Changed:
+      return "changed";
+    case SetupDifference::Kind::Added:
+      return "added";
+    case SetupDifference::Kind::Removed:
+      return "removed";
+    case SetupDifference::Kind::Moved:
+      return "moved";
+  }
+  return {};
+}
+
+std::string Line(const SetupDifference& difference) {
+  const std::string place =
+      difference.key.empty() ? difference.path : fmt::format("{}:{}", difference.path, difference.key);
+  const auto value = [](const std::string& text, bool isDefault) {
+    return fmt::format("{}{}", text, isDefault ? " (default)" : "");
+  };
+  const std::string from = value(difference.from, difference.fromDefault);
+  const std::string to = value(difference.to, difference.toDefault);
+  switch (difference.kind) {
+    case SetupDifference::Kind::Changed:
+      return fmt::format("{}: {} -> {}", place, from, to);
+    case SetupDifference::Kind::Moved:
+      return fmt::format("{}: moved here from {}", place, difference.from);
+    case SetupDifference::Kind::Added:
+      return difference.key.empty() ? fmt::format("{}: added", place) : fmt::format("{}: added: {}", place, to);
+    case SetupDifference::Kind::Removed:
+      return difference.key.empty() ? fmt::format("{}: removed", place) : fmt::format("{}: removed: {}", place, from);
+  }
+  return {};
+}
+
+std::string Json(const SetupDifference& difference) {
+  const auto optional = [](const std::string& text) { return text.empty() ? std::string() : JsonQuoted(text); };
+  return JsonObject({{"path", JsonQuoted(difference.path)},
+                     {"key", optional(difference.key)},
+                     {"kind", JsonQuoted(KindName(difference.kind))},
+                     {"from", optional(difference.from)},
+                     {"to", optional(difference.to)},
+                     {"fromDefault", difference.fromDefault ? "true" : ""},
+                     {"toDefault", difference.toDefault ? "true" : ""}});
+}
+
+}  // namespace
+
+int DiffCommand(const std::string& from, const std::string& to, bool json, Streams streams) {
+  CFlowModelDoc a, b;
+  if (!OpenSetup(a, from, streams) || !OpenSetup(b, to, streams)) return kCouldNot;
+  TellReport(a, streams);
+  TellReport(b, streams);
+  const WrittenSetup writtenA(a), writtenB(b);
+  const std::vector<SetupDifference> differences = CompareSetups(writtenA.Target(), writtenB.Target(), KeyReference());
+  if (json) {
+    std::vector<std::string> elements;
+    for (const SetupDifference& difference : differences) elements.push_back(Json(difference));
+    fmt::print(streams.out, "{}\n", JsonObject({{"differences", JsonArray(elements)}}));
+  } else {
+    for (const SetupDifference& difference : differences) fmt::print(streams.out, "{}\n", Line(difference));
+  }
+  return differences.empty() ? kDone : kFindings;
+}
+
+}  // namespace tervane

@@ -1,0 +1,59 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <fmt/format.h>
+#include <fmt/ostream.h>
+
+#include "cli/command_line.h"
+#include "cli/commands.h"
+#include "core/doc_version.h"
+#include "core/list.h"
+#include "document/key_reference.h"
+#include "platform/text.h"
+
+namespace tervane {
+
+namespace {
+
+/// The versions of documents in which a key is read, where there is a limit.
+std::string Versions(const KeyInfo& key) {
+  std::string text;
+  if (key.since != KeyInfo::kNoLimit && key.since > 0) text = fmt::format("from version {}", key.since);
+  if (key.until != KeyInfo::kNoLimit) text = fmt::format("up to version {}", key.until);
+  if (!key.written) text += text.empty() ? "read only" : ", read only";
+  return text;
+}
+
+std::string WithoutTableMarks(std::string_view text) { return Replaced(text, "|", "\\|"); }
+
+void WriteMarkdown(const KeySection& section, std::ostream& out) {
+  fmt::print(out, "\n## {}\n\n{} (`{}`)\n\n", section.path, section.title, section.className);
+  if (section.isList) fmt::print(out, "A list: begins with `{}` (int).\n\n", CYbSEKvfListBaseInterface::kItemCountKey);
+  if (section.keys.empty()) return;
+  fmt::print(out, "| Key | Type | Default | |\n|---|---|---|---|\n");
+  for (const KeyInfo& key : section.keys)
+    fmt::print(out, "| `{}` | {} | {} | {} |\n", key.key, key.type,
+               key.defaultValue.empty() ? "" : fmt::format("`{}`", WithoutTableMarks(key.defaultValue)), Versions(key));
+}
+
+void WriteText(const KeySection& section, std::ostream& out) {
+  for (const KeyInfo& key : section.keys)
+    fmt::print(out, "{}:{}\t{}\t{}\t{}\n", section.path, Trimmed(key.key), key.type, key.defaultValue, Versions(key));
+}
+
+}  // namespace
+
+int KeysCommand(bool markdown, Streams streams) {
+  const KeyReference reference;
+  if (markdown)
+    fmt::print(streams.out,
+               "# Keys of a setup\n\nDocument version {}. Every section begins with `Touched` (int, whether its page "
+               "was visited) and `IsDataUsedInSetup` (int, computed at every save).\n",
+               CFlowModelDocVersionKvf::kWrittenVersion);
+  else
+    fmt::print(streams.out, "PLACE\tTYPE\tDEFAULT\tVERSIONS\n");
+  for (const KeySection& section : reference.Sections())
+    markdown ? WriteMarkdown(section, streams.out) : WriteText(section, streams.out);
+  return kDone;
+}
+
+}  // namespace tervane

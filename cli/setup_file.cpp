@@ -1,0 +1,102 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "cli/setup_file.h"
+
+#include <algorithm>
+#include <vector>
+
+#include <fmt/format.h>
+#include <fmt/ostream.h>
+
+#include "platform/paths.h"
+#include "platform/text.h"
+
+namespace tervane {
+
+bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams) {
+  if (document.OnOpenDocument(file)) return true;
+  fmt::print(streams.err, "{}\n", document.Error());
+  return false;
+}
+
+void TellReport(const CFlowModelDoc& document, Streams streams) {
+  const LoadReport& report = document.Report();
+  for (const LoadReport::Entry& entry : report.entries)
+    fmt::print(streams.err, "{}:{}: {}{}{}: {}\n", document.PathName(), entry.line, entry.path,
+               entry.key.empty() ? "" : ":", entry.key, entry.text);
+  for (const KvfUnread& unread : report.unread)
+    fmt::print(streams.err, "{}:{}: {}\n", document.PathName(), unread.line, unread.text);
+}
+
+namespace {
+
+/// ", did you mean X?" for the name that comes nearest, or nothing.
+std::string Suggestion(const std::string& typed, const std::vector<std::string>& names) {
+  const std::string* nearest = nullptr;
+  std::size_t least = typed.size() / 3 + 2;
+  for (const std::string& name : names) {
+    if (EqualIgnoringCase(name, typed)) return fmt::format("; did you mean {}?", name);
+    const std::size_t distance = EditDistance(name, typed);
+    if (distance >= least) continue;
+    least = distance;
+    nearest = &name;
+  }
+  return nearest ? fmt::format("; did you mean {}?", *nearest) : std::string();
+}
+
+}  // namespace
+
+CYbSEKvfBase* FindNodeOrTell(CFlowModelDoc& document, const SetupPath& path, const std::string& typed,
+                             Streams streams) {
+  if (!path.error.empty()) {
+    fmt::print(streams.err, "{}: {}\n", typed, path.error);
+    return nullptr;
+  }
+  CYbSEKvfBase* node = &document.Root();
+  for (const PathStep& step : path.steps) {
+    CYbSEKvfBase* child = FindChild(*node, step);
+    if (!child) {
+      std::vector<std::string> names;
+      for (CYbSEKvfBase* other = node->GetFirstChild(); other; other = node->GetNextChild(other))
+        names.push_back(StepName(*other));
+      fmt::print(streams.err, "{}: there is no {} here{} (tervane tree FILE --all --paths lists all places)\n", typed,
+                 PathName(step.name, step.instance), Suggestion(step.name, names));
+      return nullptr;
+    }
+    node = child;
+  }
+  return node;
+}
+
+WrittenSetup::WrittenSetup(const CFlowModelDoc& document)
+    : file_(document.BuildFile(std::string(FolderOf(AbsoluteFromHere(document.PathName()))))),
+      target_(AsSection(FindKvfNode(file_->top, false, document.Root().GetTargetName()))) {}
+
+KvfSection* WrittenSetup::SectionOf(const CYbSEKvfBase& node) const {
+  const CYbSEKvfBase* parent = node.GetParent();
+  if (!parent) return target_;
+  KvfSection* section = SectionOf(*parent);
+  if (!section || node.GetSectionName().empty()) return section;
+  // Like sections are told apart by their place among each other.
+  const std::string name = node.FormattedSectionName();
+  std::size_t instance = 1;
+  for (CYbSEKvfBase* sibling = parent->GetFirstChild(); sibling != &node; sibling = parent->GetNextChild(sibling))
+    instance += sibling->FormattedSectionName() == name;
+  return AsSection(FindKvfNode(*section, false, name, instance));
+}
+
+KvfNode* FindKeyOrTell(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams) {
+  if (key.name.empty()) {
+    fmt::print(streams.err, "{}: a key was expected behind the section, as in SimSpec:ModelType\n", typed);
+    return nullptr;
+  }
+  if (KvfNode* found = FindKvfNode(section, true, Trimmed(key.name), static_cast<std::size_t>(key.instance)))
+    return found;
+  std::vector<std::string> names;
+  for (const KvfNode* node = section.firstChild; node; node = node->next)
+    if (node->IsKeyword()) names.emplace_back(node->Name());
+  fmt::print(streams.err, "{}: there is no key {} here{}\n", typed, key.name, Suggestion(key.name, names));
+  return nullptr;
+}
+
+}  // namespace tervane

@@ -1,0 +1,43 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <string>
+
+#include "cli/commands.h"
+#include "document/flow_model_document.h"
+
+namespace tervane {
+
+/// Opens a setup; tells on the error stream why that failed.
+bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams);
+
+/// Tells what the user should know of the loading, a line each; for commands whose result is something else.
+void TellReport(const CFlowModelDoc& document, Streams streams);
+
+/// A place as a person types it, found in a tree; null, with a message that names what comes near, when it is not
+/// there.
+CYbSEKvfBase* FindNodeOrTell(CFlowModelDoc& document, const SetupPath& path, const std::string& typed, Streams streams);
+
+/// A file as the document would save it in its own folder.
+class WrittenSetup {
+ public:
+  explicit WrittenSetup(const CFlowModelDoc& document);
+  ~WrittenSetup() { kvfClose(&file_); }
+  WrittenSetup(const WrittenSetup&) = delete;
+  WrittenSetup& operator=(const WrittenSetup&) = delete;
+
+  KvfFile& File() const { return *file_; }
+  KvfSection& Target() const { return *target_; }
+  /// The section in which a node's keys stand.
+  KvfSection* SectionOf(const CYbSEKvfBase& node) const;
+
+ private:
+  KvfFile* file_;
+  KvfSection* target_;
+};
+
+/// The key that a path names in its section; null, with a message, when it is not there.
+KvfNode* FindKeyOrTell(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams);
+
+}  // namespace tervane

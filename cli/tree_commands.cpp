@@ -1,0 +1,78 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <fmt/format.h>
+#include <fmt/ostream.h>
+
+#include "cli/command_line.h"
+#include "cli/commands.h"
+#include "cli/json.h"
+#include "cli/setup_file.h"
+#include "core/kvf_writer.h"
+#include "core/list.h"
+#include "document/key_reference.h"
+
+namespace tervane {
+
+int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams) {
+  CFlowModelDoc document;
+  if (!OpenSetup(document, file, streams)) return kCouldNot;
+  std::vector<std::string> json;
+  WalkNodes(document.Root(), [&](const NodePlace& place) {
+    if (!all && !place.takesPart) return;
+    switch (form) {
+      case TreeForm::Json:
+        json.push_back(JsonObject({{"path", JsonQuoted(place.path)},
+                                   {"class", JsonQuoted(ClassNameOf(place.node))},
+                                   {"title", JsonQuoted(place.node.GetTitle())},
+                                   {"used", JsonBool(place.takesPart)}}));
+        break;
+      case TreeForm::Paths:
+        fmt::print(streams.out, "{}\n", place.path);
+        break;
+      case TreeForm::Text:
+        fmt::print(streams.out, "{:{}}{}  {}{}\n", "", 2 * (place.depth - 1), StepName(place.node),
+                   place.node.GetTitle(), place.takesPart ? "" : "  (takes no part)");
+        break;
+    }
+  });
+  if (form == TreeForm::Json) fmt::print(streams.out, "{}\n", JsonObject({{"nodes", JsonArray(json)}}));
+  return kDone;
+}
+
+namespace {
+
+/// The node's keys as they would be saved, with their defaults where they differ, and its findings.
+void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyReference& reference, Streams streams) {
+  fmt::print(streams.out, "{}  {} ({}){}\n", place.path, place.node.GetTitle(), ClassNameOf(place.node),
+             place.takesPart ? "" : ", takes no part");
+  for (const Finding& finding : place.node.Findings())
+    fmt::print(streams.out, "  ! {}: {}\n", finding.severity == Severity::Error ? "error" : "warning", finding.text);
+  const KvfSection* section = place.node.GetSectionName().empty() ? nullptr : written.SectionOf(place.node);
+  for (const KvfNode* node = section ? section->firstChild : nullptr; node; node = node->next) {
+    if (!node->IsKeyword()) continue;
+    const std::string value = KvfValuesText(*node);
+    const std::string_view standard = reference.DefaultOf(place.path, node->Name());
+    fmt::print(streams.out, "  {} = {}{}\n", node->Name(), value,
+               standard.empty() || standard == value ? std::string() : fmt::format("  (default {})", standard));
+  }
+}
+
+}  // namespace
+
+int ShowCommand(const std::string& file, const std::string& typed, Streams streams) {
+  CFlowModelDoc document;
+  if (!OpenSetup(document, file, streams)) return kCouldNot;
+  const SetupPath path = ParseSetupPath(typed);
+  const CYbSEKvfBase* wanted = FindNodeOrTell(document, path, typed, streams);
+  if (!wanted) return kCouldNot;
+  if (!path.key.name.empty()) return GetCommand(file, typed, streams);
+  const WrittenSetup written(document);
+  const KeyReference reference;
+  WalkNodes(document.Root(), [&](const NodePlace& place) {
+    for (const CYbSEKvfBase* node = &place.node; node; node = node->GetParent())
+      if (node == wanted) return ShowNode(place, written, reference, streams);
+  });
+  return kDone;
+}
+
+}  // namespace tervane

@@ -1,0 +1,62 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "document/key_reference.h"
+
+#include "core/list.h"
+#include "core/path.h"
+#include "document/global.h"
+#include "platform/text.h"
+
+namespace tervane {
+
+namespace {
+
+void Describe(CYbSEKvfBase& node, const std::string& parentPath, std::vector<KeySection>& sections) {
+  const std::string& name = node.GetSectionName();
+  const std::string path = name.empty() ? parentPath : JoinPath(parentPath, PathName(name));
+  auto* list = dynamic_cast<CYbSEKvfListBaseInterface*>(&node);
+  KeySection section{path, ClassNameOf(node), node.GetTitle(), list != nullptr, {}};
+  node.DescribeKeys(section.keys);
+  if (!name.empty() || !section.keys.empty()) sections.push_back(std::move(section));
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+    Describe(*child, path, sections);
+  // All items are alike: one that is not in the list stands for them.
+  if (list && list->GetItemCount() == 0) Describe(*list->NewItemNode(), path, sections);
+}
+
+/// The path with `%d` for the number that each step ends in: "A/Item_12/B" gives "A/Item_%d/B".
+std::string Numbered(std::string_view path) {
+  std::string result;
+  while (!path.empty()) {
+    const std::size_t end = std::min(path.find('/'), path.size());
+    const std::string_view step = path.substr(0, end);
+    const std::size_t digits = step.find_last_not_of("0123456789") + 1;
+    result += step.substr(0, digits);
+    if (digits < step.size()) result += "%d";
+    path.remove_prefix(end);
+    if (path.empty()) break;
+    result += '/';
+    path.remove_prefix(1);
+  }
+  return result;
+}
+
+}  // namespace
+
+KeyReference::KeyReference() {
+  CGlobal root;
+  for (CYbSEKvfBase* child = root.GetFirstChild(); child; child = root.GetNextChild(child))
+    Describe(*child, {}, sections_);
+  for (std::size_t i = 0; i < sections_.size(); ++i) byPath_.emplace(sections_[i].path, i);
+}
+
+std::string_view KeyReference::DefaultOf(std::string_view sectionPath, std::string_view key) const {
+  auto found = byPath_.find(std::string(sectionPath));
+  if (found == byPath_.end()) found = byPath_.find(Numbered(sectionPath));
+  if (found == byPath_.end()) return {};
+  for (const KeyInfo& info : sections_[found->second].keys)
+    if (Trimmed(info.key) == key) return info.defaultValue;
+  return {};
+}
+
+}  // namespace tervane

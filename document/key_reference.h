@@ -1,0 +1,38 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "core/key_exchange.h"
+
+namespace tervane {
+
+/// The keys of one node class at one place of the tree.
+struct KeySection {
+  std::string path;  ///< Sections joined by `/`, with `%d` where items are numbered.
+  std::string className;
+  std::string title;
+  bool isList = false;  ///< The section begins with the item count.
+  std::vector<KeyInfo> keys;
+};
+
+/// All keys of all sections, with their types and defaults, as the nodes declare them.
+class KeyReference {
+ public:
+  KeyReference();
+
+  const std::vector<KeySection>& Sections() const { return sections_; }
+  /// The default of a key as the file holds it; empty when the key is unknown or has none. The path is that of a
+  /// section in a file, with the items' numbers.
+  std::string_view DefaultOf(std::string_view sectionPath, std::string_view key) const;
+
+ private:
+  std::vector<KeySection> sections_;
+  std::unordered_map<std::string, std::size_t> byPath_;
+};
+
+}  // namespace tervane

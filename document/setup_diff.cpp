@@ -1,0 +1,182 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "document/setup_diff.h"
+
+#include <algorithm>
+#include <array>
+#include <unordered_map>
+
+#include "core/kvf_writer.h"
+#include "core/list.h"
+#include "core/path.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr std::array<std::string_view, 3> kComputed{"Touched", "IsDataUsedInSetup",
+                                                    CYbSEKvfListBaseInterface::kItemCountKey};
+
+bool IsComputed(std::string_view key) { return std::find(kComputed.begin(), kComputed.end(), key) != kComputed.end(); }
+
+/// Nodes of one kind, with the instance number of each among those of its name.
+struct NumberedNode {
+  KvfNode* node;
+  int instance;
+  std::string Name() const { return PathName(node->Name(), instance); }
+};
+
+std::vector<NumberedNode> ChildrenOf(const KvfSection& section, bool keywords) {
+  std::vector<NumberedNode> children;
+  std::unordered_map<std::string_view, int> instances;
+  for (KvfNode* node = section.firstChild; node; node = node->next)
+    if (node->IsKeyword() == keywords) children.push_back({node, ++instances[node->Name()]});
+  return children;
+}
+
+/// Places in a longest increasing run of `values`: what moved least.
+std::vector<bool> LongestIncreasing(const std::vector<std::size_t>& values) {
+  std::vector<std::size_t> ends;  // place of the smallest end of a run of each length
+  std::vector<std::size_t> before(values.size(), values.size());
+  for (std::size_t i = 0; i < values.size(); ++i) {
+    const auto at = std::lower_bound(ends.begin(), ends.end(), values[i],
+                                     [&](std::size_t place, std::size_t value) { return values[place] < value; });
+    if (at != ends.begin()) before[i] = *(at - 1);
+    if (at == ends.end())
+      ends.push_back(i);
+    else
+      *at = i;
+  }
+  std::vector<bool> isIn(values.size(), false);
+  for (std::size_t i = ends.empty() ? values.size() : ends.back(); i < values.size(); i = before[i]) isIn[i] = true;
+  return isIn;
+}
+
+class Comparison {
+ public:
+  explicit Comparison(const KeyReference& reference) : reference_(reference) {}
+
+  std::vector<SetupDifference> result;
+
+  void CompareSections(KvfSection& from, KvfSection& to, const std::string& path) {
+    CompareKeys(from, to, path);
+    const std::vector<NumberedNode> olds = ChildrenOf(from, false);
+    const std::vector<NumberedNode> news = ChildrenOf(to, false);
+    const bool isList = FindKvfNode(to, true, CYbSEKvfListBaseInterface::kItemCountKey) ||
+                        FindKvfNode(from, true, CYbSEKvfListBaseInterface::kItemCountKey);
+    std::vector<std::size_t> partner = isList ? MatchItems(olds, news) : MatchNames(olds, news);
+    if (isList) ReportMoves(olds, news, partner, path);
+    std::vector<bool> isMatched(olds.size(), false);
+    for (std::size_t i = 0; i < news.size(); ++i) {
+      const std::string childPath = JoinPath(path, news[i].Name());
+      if (partner[i] == kNone) {
+        result.push_back({SetupDifference::Kind::Added, childPath, {}, {}, {}});
+        continue;
+      }
+      isMatched[partner[i]] = true;
+      CompareSections(*AsSection(olds[partner[i]].node), *AsSection(news[i].node), childPath);
+    }
+    for (std::size_t i = 0; i < olds.size(); ++i)
+      if (!isMatched[i]) result.push_back({SetupDifference::Kind::Removed, JoinPath(path, olds[i].Name()), {}, {}, {}});
+  }
+
+ private:
+  static constexpr std::size_t kNone = static_cast<std::size_t>(-1);
+
+  void CompareKeys(KvfSection& from, KvfSection& to, const std::string& path) {
+    const auto isDefault = [&](const NumberedNode& key, const std::string& value) {
+      return value == reference_.DefaultOf(path, key.node->Name());
+    };
+    for (const NumberedNode& key : ChildrenOf(to, true)) {
+      if (IsComputed(key.node->Name())) continue;
+      const std::string value = KvfValuesText(*key.node);
+      const KvfNode* old = FindKvfNode(from, true, key.node->Name(), static_cast<std::size_t>(key.instance));
+      const std::string oldValue = old ? KvfValuesText(*old) : std::string();
+      if (old && oldValue == value) continue;
+      result.push_back({old ? SetupDifference::Kind::Changed : SetupDifference::Kind::Added, path, key.Name(), oldValue,
+                        value, old && isDefault(key, oldValue), isDefault(key, value)});
+    }
+    for (const NumberedNode& key : ChildrenOf(from, true)) {
+      if (IsComputed(key.node->Name()) ||
+          FindKvfNode(to, true, key.node->Name(), static_cast<std::size_t>(key.instance)))
+        continue;
+      const std::string value = KvfValuesText(*key.node);
+      result.push_back({SetupDifference::Kind::Removed, path, key.Name(), value, {}, isDefault(key, value), false});
+    }
+  }
+
+  /// For each new section the place of its old one, or `kNone`.
+  static std::vector<std::size_t> MatchNames(const std::vector<NumberedNode>& olds,
+                                             const std::vector<NumberedNode>& news) {
+    std::unordered_map<std::string, std::size_t> places;
+    for (std::size_t i = 0; i < olds.size(); ++i) places.emplace(olds[i].Name(), i);
+    std::vector<std::size_t> partner(news.size(), kNone);
+    for (std::size_t i = 0; i < news.size(); ++i)
+      if (const auto found = places.find(news[i].Name()); found != places.end()) partner[i] = found->second;
+    return partner;
+  }
+
+  /// The text by which an item of a list is followed: its content, its name, or its section; empty when it has none.
+  enum class Trait { Content, Name, Section };
+  static std::string TraitOf(const NumberedNode& item, Trait trait) {
+    if (trait == Trait::Section) return item.Name();
+    KvfSection& section = *AsSection(item.node);
+    std::string text;
+    if (trait == Trait::Content)
+      AppendKvfNodes(section, 0, text);
+    else if (const KvfNode* name = FindKvfNode(section, true, "Name"))
+      text = KvfValuesText(*name);
+    return text;
+  }
+
+  static std::vector<std::size_t> MatchItems(const std::vector<NumberedNode>& olds,
+                                             const std::vector<NumberedNode>& news) {
+    std::vector<std::size_t> partner(news.size(), kNone);
+    std::vector<bool> isTaken(olds.size(), false);
+    for (const Trait trait : {Trait::Content, Trait::Name, Trait::Section}) {
+      std::unordered_map<std::string, std::vector<std::size_t>> places;
+      for (std::size_t i = olds.size(); i-- > 0;)
+        if (!isTaken[i]) places[TraitOf(olds[i], trait)].push_back(i);
+      places.erase(std::string());
+      for (std::size_t i = 0; i < news.size(); ++i) {
+        if (partner[i] != kNone) continue;
+        const auto found = places.find(TraitOf(news[i], trait));
+        if (found == places.end() || found->second.empty()) continue;
+        partner[i] = found->second.back();
+        isTaken[partner[i]] = true;
+        found->second.pop_back();
+      }
+    }
+    return partner;
+  }
+
+  void ReportMoves(const std::vector<NumberedNode>& olds, const std::vector<NumberedNode>& news,
+                   const std::vector<std::size_t>& partner, const std::string& path) {
+    std::vector<std::size_t> matched, oldPlaces;
+    for (std::size_t i = 0; i < news.size(); ++i) {
+      if (partner[i] == kNone) continue;
+      matched.push_back(i);
+      oldPlaces.push_back(partner[i]);
+    }
+    const std::vector<bool> stays = LongestIncreasing(oldPlaces);
+    for (std::size_t i = 0; i < matched.size(); ++i)
+      if (!stays[i])
+        result.push_back({SetupDifference::Kind::Moved,
+                          JoinPath(path, news[matched[i]].Name()),
+                          {},
+                          olds[oldPlaces[i]].Name(),
+                          news[matched[i]].Name()});
+  }
+
+  const KeyReference& reference_;
+};
+
+}  // namespace
+
+std::vector<SetupDifference> CompareSetups(KvfSection& from, KvfSection& to, const KeyReference& reference) {
+  Comparison comparison(reference);
+  comparison.CompareSections(from, to, {});
+  return std::move(comparison.result);
+}
+
+}  // namespace tervane

@@ -1,0 +1,30 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "core/kvf_tree.h"
+#include "document/key_reference.h"
+
+namespace tervane {
+
+/// One difference between two setups.
+struct SetupDifference {
+  enum class Kind { Changed, Added, Removed, Moved };
+  Kind kind;
+  std::string path;  ///< Of the section, in the new setup; of a removed one in the old.
+  std::string key;   ///< Empty when a whole section is meant.
+  std::string from;  ///< As the file holds it; of a moved item its old section name.
+  std::string to;
+  bool fromDefault = false;  ///< The value is the key's default.
+  bool toDefault = false;
+};
+
+/// The differences between two sections as they are written, in the order of the new one. Items of a list are followed
+/// to their new places: first by equal content, then by equal `Name`, then by place. What every save computes anew
+/// (`IsDataUsedInSetup`, item counts) and whether a page was visited (`Touched`) is left out.
+std::vector<SetupDifference> CompareSetups(KvfSection& from, KvfSection& to, const KeyReference& reference);
+
+}  // namespace tervane
