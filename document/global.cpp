@@ -11,7 +11,7 @@
 #include "document/saturated_zone_reload.h"
 #include "document/view_settings.h"
 #include "exchange/overlays.h"
-#include "run/execute_flags.h"
+#include "execution/execute_flags.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/extra_params.h"
 #include "simspec/introduction.h"

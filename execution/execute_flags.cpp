@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "run/execute_flags.h"
+#include "execution/execute_flags.h"
 
 #include "simspec/model_components.h"
 
