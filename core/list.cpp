@@ -107,7 +107,7 @@ void CYbSEKvfListBaseInterface::Load(KvfNode* parentSection) {
   KvfNode* section = GetSectionUsed() && !GetSectionName().empty() ? FindSection(parentSection) : nullptr;
   if (!section) return;
   int missing = 0;
-  for (int number = 1; number <= GetItemCount(); ++number) missing += !HadSection(*GetItemNode(number));
+  for (int number = 1; number <= GetItemCount(); ++number) missing += MissedSection(*GetItemNode(number));
   if (missing > 0)
     kvfAddNote(section, kItemCountKey,
                fmt::format("{} of {} items have no section: they are at their defaults", missing, GetItemCount()));

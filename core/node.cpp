@@ -110,15 +110,14 @@ void CYbSEKvfBase::SetHelp(std::string helpFile, std::string page) {
 
 void CYbSEKvfBase::Load(KvfNode* parentSection) {
   if (!GetSectionUsed()) return;
-  KvfNode* section = parentSection;
-  if (GetSectionName().empty()) {
-    if (parent_) touched_ = parent_->touched_;
-  } else {
-    section = FindSection(parentSection);
-    hadSection_ = section != nullptr;
-    if (!section) return;
+  const bool hasSection = !GetSectionName().empty();
+  KvfNode* section = hasSection ? FindSection(parentSection) : parentSection;
+  missedSection_ = section == nullptr;
+  if (!section) return;
+  if (hasSection)
     ReadTouched(section);
-  }
+  else if (parent_)
+    touched_ = parent_->touched_;
   LoadSize(section);
   ReadData(section);
   LoadChildren(section);
@@ -138,7 +137,9 @@ void CYbSEKvfBase::LoadChildren(KvfNode* section) {
   for (std::size_t place = 0; place < children_.size(); ++place) {
     CYbSEKvfBase& child = *children_[place];
     const std::string& name = child.GetSectionName();
-    if (!name.empty() && name.find("%d") == std::string::npos) child.sectionInstance_ = ++instances[name];
+    const bool isNumbered = name.find("%d") != std::string::npos;
+    // A child without a section in the file takes no place.
+    if (!name.empty() && !isNumbered && child.GetSectionUsed()) child.sectionInstance_ = ++instances[name];
     child.Load(section);
   }
 }
@@ -153,9 +154,27 @@ void CYbSEKvfBase::Save(KvfFile* file) {
     SaveSize(file);
   }
   WriteData(file);
+  SaveChildren(file);
+  if (hasSection) kvfEndSection(file);
+}
+
+void CYbSEKvfBase::SaveChildren(KvfFile* file) {
   for (const auto& property : properties_) property->Save(file);
   for (const auto& child : children_) child->Save(file);
-  if (hasSection) kvfEndSection(file);
+}
+
+void CYbSEKvfGroupBase::Load(KvfNode* parentSection) {
+  if (!GetSectionName().empty())
+    CYbSEKvfBase::Load(parentSection);
+  else if (GetSectionUsed() && parentSection)
+    LoadChildren(parentSection);
+}
+
+void CYbSEKvfGroupBase::Save(KvfFile* file) {
+  if (!GetSectionName().empty())
+    CYbSEKvfBase::Save(file);
+  else if (GetSectionUsed())
+    SaveChildren(file);
 }
 
 void CYbSEKvfBase::ReadData(KvfNode* section) {
