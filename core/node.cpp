@@ -193,10 +193,11 @@ void CYbSEKvfBase::DescribeKeys(std::vector<KeyInfo>& keys) {
 }
 
 void CYbSEKvfBase::TouchAllChildren() {
-  for (const auto& child : children_) {
-    child->Touch();
-    child->TouchAllChildren();
-  }
+  for (const auto* nodes : {&properties_, &children_})
+    for (const auto& node : *nodes) {
+      node->Touch();
+      node->TouchAllChildren();
+    }
 }
 
 // ---- Taking part and validation
@@ -215,6 +216,8 @@ int CYbSEKvfBase::Validate() {
                return finding.severity == Severity::Error;
              });
   }
+  for (const auto& property : properties_)
+    if (!property->Validate()) valid_ = 0;
   for (std::size_t place = 0; place < children_.size(); ++place)
     if (!children_[place]->Validate()) valid_ = 0;
   return valid_;
@@ -242,6 +245,7 @@ CYbSEKvfGlobalBase::CYbSEKvfGlobalBase(std::string targetName)
 CYbSEKvfGlobalBase::~CYbSEKvfGlobalBase() {
   // Nodes look each other up while they die: from here on nobody is found.
   importantNodes_.clear();
+  properties_.clear();
   children_.clear();
 }
 
