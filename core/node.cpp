@@ -7,6 +7,7 @@
 
 #include <fmt/format.h>
 
+#include "core/kvf_writer.h"
 #include "platform/os.h"
 
 namespace tervane {
@@ -323,10 +324,11 @@ std::string ClassNameOf(const CYbSEKvfBase& node) {
 // ---- Overview
 
 int CYbSEKvfBase::AddToOverview(std::vector<OverviewLine>& lines, int level) {
-  std::vector<KeyInfo> keys;
-  DescribeKeys(keys);
-  for (const KeyInfo& key : keys)
-    if (key.written) lines.push_back({GetTitle(), level, fmt::format("{} = {}", key.key, key.defaultValue)});
+  KvfFile written;
+  kvfAddTarget(&written, "Keys");
+  WriteData(&written);
+  for (const KvfNode* node = written.Cursor().firstChild; node; node = node->next)
+    if (node->IsKeyword()) lines.push_back({GetTitle(), level, fmt::format("{} = {}", node->Name(), KvfValuesText(*node))});
   return 1;
 }
 
