@@ -32,14 +32,9 @@ void CYbSEKvfListBaseInterface::ForwardToItems(int level,
 void CYbSEKvfListBaseInterface::SetItemCount(int count, int level) {
   if (level != 1) return ForwardToItems(level, [count](auto& list, int below) { list.SetItemCount(count, below); });
   while (GetItemCount() > std::max(count, 0)) children_.pop_back();
-  while (GetItemCount() < count) {
-    children_.push_back(NewItemNode());
-    // All items of a touched list are touched already, but for the new one and what it holds.
-    if (GetHasBeenTouched() == 1) {
-      children_.back()->Touch();
-      children_.back()->TouchAllChildren();
-    }
-  }
+  const bool grows = GetItemCount() < count;
+  while (GetItemCount() < count) children_.push_back(NewItemNode());
+  if (grows && GetHasBeenTouched() == 1) TouchAllChildren();
   for (const auto& [list, listLevel] : syncedLists_) list->SetItemCount(count, listLevel);
 }
 
