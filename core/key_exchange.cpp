@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "core/key_exchange.h"
 
+#include <algorithm>
+
 #include <fmt/format.h>
 
 #include "core/kvf_writer.h"
@@ -14,7 +16,8 @@ KeyExchange KeyExchange::Reading(KvfNode* section, int docVersion) {
   static KvfSection empty;
   KeyExchange keys;
   keys.section_ = section ? section : &empty;
-  keys.docVersion_ = docVersion;
+  // A version below "none" is as old.
+  keys.docVersion_ = std::max(docVersion, -1);
   return keys;
 }
 
