@@ -227,15 +227,16 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
 
   void DeleteItem(int number, int level) override {
     if (Item* item = level == 1 ? this->GetItem(number) : nullptr) {
-      for (auto* dependent : this->DependentLists()) {
-        ItemBase* entry = dependent->FindDependentItem(item->GetId());
-        if (!entry) continue;
-        item->RemoveLinkedItem(entry);
-        dependent->RemoveDependentItem(entry);
-      }
+      UnlinkItem(*item);
       ++nameOffset_;
     }
     Nodes::DeleteItem(number, level);
+  }
+
+  void SetItemCount(int count, int level) override {
+    if (level == 1)
+      for (int number = this->GetItemCount(); number > std::max(count, 0); --number) UnlinkItem(*this->GetItem(number));
+    Nodes::SetItemCount(count, level);
   }
 
   bool MoveItemUp(int number, int level) override {
@@ -288,6 +289,15 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
       ++nameOffset_;
     }
     return baseName_ + std::to_string(nameOffset_ + this->GetItemCount());
+  }
+
+  void UnlinkItem(Item& item) {
+    for (auto* dependent : this->DependentLists()) {
+      ItemBase* entry = dependent->FindDependentItem(item.GetId());
+      if (!entry) continue;
+      item.RemoveLinkedItem(entry);
+      dependent->RemoveDependentItem(entry);
+    }
   }
 
   void BringDependentsTo(Item& item, int number) {
