@@ -252,6 +252,18 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
     return true;
   }
 
+  /// Items whose section is missing are named and linked like added ones.
+  void Load(KvfNode* parentSection) override {
+    Nodes::Load(parentSection);
+    for (int number = 1; number <= this->GetItemCount(); ++number) {
+      Item* item = this->GetItem(number);
+      if (!this->MissedSection(*item)) continue;
+      if (item->GetName().empty()) item->SetName(NewName(*item));
+      LinkNewItem(item);
+      BringDependentsTo(*item, number);
+    }
+  }
+
   /// Gives each dependent an entry for a master entry that has none yet, and tells the new entry of its circumstances.
   void LinkNewItem(ItemBase* masterItem) override {
     if (!masterItem->LinkedItems().empty()) return;
