@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "core/list.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -300,7 +301,19 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
       ++nameCounter_;
       ++nameOffset_;
     }
-    return baseName_ + std::to_string(nameOffset_ + this->GetItemCount());
+    const auto name = [this] { return baseName_ + std::to_string(nameOffset_ + this->GetItemCount()); };
+    // The names of a file come in any order and any case.
+    while (IsTaken(name(), newItem)) {
+      ++nameCounter_;
+      ++nameOffset_;
+    }
+    return name();
+  }
+  bool IsTaken(const std::string& name, const Item& exceptBy) {
+    for (int number = 1; number <= this->GetItemCount(); ++number)
+      if (const Item* other = this->GetItem(number); other != &exceptBy && EqualIgnoringCase(other->GetName(), name))
+        return true;
+    return false;
   }
 
   void UnlinkItem(Item& item) {

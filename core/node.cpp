@@ -328,7 +328,8 @@ int CYbSEKvfBase::AddToOverview(std::vector<OverviewLine>& lines, int level) {
   kvfAddTarget(&written, "Keys");
   WriteData(&written);
   for (const KvfNode* node = written.Cursor().firstChild; node; node = node->next)
-    if (node->IsKeyword()) lines.push_back({GetTitle(), level, fmt::format("{} = {}", node->Name(), KvfValuesText(*node))});
+    if (node->IsKeyword())
+      lines.push_back({GetTitle(), level, fmt::format("{} = {}", node->Name(), KvfValuesText(*node))});
   return 1;
 }
 

@@ -186,7 +186,7 @@ class CYbSEKvfBase {
   int touched_ = 0;
   int sectionNumber_ = -1;
   int sectionUsed_ = 1;
-  int sectionInstance_ = 1;   ///< Which of several like sections of the parent is this node's.
+  int sectionInstance_ = 1;     ///< Which of several like sections of the parent is this node's.
   bool missedSection_ = false;  ///< The latest load looked for the section and did not find it.
   bool isImportant_ = false;    ///< Registered at the root at least once.
   int valid_ = 1;
