@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "core/list.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -227,15 +228,16 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
 
   void DeleteItem(int number, int level) override {
     if (Item* item = level == 1 ? this->GetItem(number) : nullptr) {
-      for (auto* dependent : this->DependentLists()) {
-        ItemBase* entry = dependent->FindDependentItem(item->GetId());
-        if (!entry) continue;
-        item->RemoveLinkedItem(entry);
-        dependent->RemoveDependentItem(entry);
-      }
+      UnlinkItem(*item);
       ++nameOffset_;
     }
     Nodes::DeleteItem(number, level);
+  }
+
+  void SetItemCount(int count, int level) override {
+    if (level == 1)
+      for (int number = this->GetItemCount(); number > std::max(count, 0); --number) UnlinkItem(*this->GetItem(number));
+    Nodes::SetItemCount(count, level);
   }
 
   bool MoveItemUp(int number, int level) override {
@@ -249,6 +251,18 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
     if (!Nodes::MoveItemDown(number, level)) return false;
     BringDependentsTo(*item, number + 1);
     return true;
+  }
+
+  /// Items whose section is missing are named and linked like added ones.
+  void Load(KvfNode* parentSection) override {
+    Nodes::Load(parentSection);
+    for (int number = 1; number <= this->GetItemCount(); ++number) {
+      Item* item = this->GetItem(number);
+      if (!this->MissedSection(*item)) continue;
+      if (item->GetName().empty()) item->SetName(NewName(*item));
+      LinkNewItem(item);
+      BringDependentsTo(*item, number);
+    }
   }
 
   /// Gives each dependent an entry for a master entry that has none yet, and tells the new entry of its circumstances.
@@ -287,7 +301,28 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
       ++nameCounter_;
       ++nameOffset_;
     }
-    return baseName_ + std::to_string(nameOffset_ + this->GetItemCount());
+    const auto name = [this] { return baseName_ + std::to_string(nameOffset_ + this->GetItemCount()); };
+    // The names of a file come in any order and any case.
+    while (IsTaken(name(), newItem)) {
+      ++nameCounter_;
+      ++nameOffset_;
+    }
+    return name();
+  }
+  bool IsTaken(const std::string& name, const Item& exceptBy) {
+    for (int number = 1; number <= this->GetItemCount(); ++number)
+      if (const Item* other = this->GetItem(number); other != &exceptBy && EqualIgnoringCase(other->GetName(), name))
+        return true;
+    return false;
+  }
+
+  void UnlinkItem(Item& item) {
+    for (auto* dependent : this->DependentLists()) {
+      ItemBase* entry = dependent->FindDependentItem(item.GetId());
+      if (!entry) continue;
+      item.RemoveLinkedItem(entry);
+      dependent->RemoveDependentItem(entry);
+    }
   }
 
   void BringDependentsTo(Item& item, int number) {

@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "core/key_exchange.h"
 
+#include <algorithm>
+
 #include <fmt/format.h>
 
 #include "core/kvf_writer.h"
@@ -14,7 +16,8 @@ KeyExchange KeyExchange::Reading(KvfNode* section, int docVersion) {
   static KvfSection empty;
   KeyExchange keys;
   keys.section_ = section ? section : &empty;
-  keys.docVersion_ = docVersion;
+  // A version below "none" is as old.
+  keys.docVersion_ = std::max(docVersion, -1);
   return keys;
 }
 
@@ -50,7 +53,10 @@ void KeyExchange::Describe(const Rule& rule, std::string_view type) {
 void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
   int year = value.Year(), month = value.Month(), day = value.Day();
   if (IsReading()) {
-    if (kvfGetListParam(section_, key, 1, "iii", &year, &month, &day)) value = CYbDateTime(year, month, day);
+    if (!kvfGetListParam(section_, key, 1, "iii", &year, &month, &day)) return;
+    value = CYbDateTime(year, month, day);
+    if (!value.IsValid() && (year != 0 || month != 0 || day != 0))
+      kvfAddNote(section_, key, "year, month, day that name a date were expected");
     return;
   }
   kvfPutListParam(file_, key, "iii", year, month, day);
@@ -71,7 +77,13 @@ bool KeyExchange::Read(std::string_view key, FileName& value) {
   std::string absolute;
   // The absolute form is asked for its notes on a wrong type; what is kept is the text as it stood.
   if (!keyword || !kvfGetParamFilename(section_, key, &absolute, 1, 1)) return false;
-  value = FileName(std::string(keyword->params[0].Text()), kvfFolderOf(section_));
+  const std::string_view text = keyword->params[0].Text();
+  if (EndsInSeparator(text)) {
+    kvfAddNote(section_, key, "a folder stands where a file was expected: it reads as empty");
+    value = FileName();
+  } else {
+    value = FileName(std::string(text), kvfFolderOf(section_));
+  }
   return true;
 }
 

@@ -69,9 +69,9 @@ class KeyExchange {
   }
   /// Counted from 1 in the file and from 0 in memory.
   void FromOne(std::string_view key, int& value) {
-    int inFile = value + 1;
-    Exchange({key}, inFile);
-    if (IsReading()) value = inFile - 1;
+    // Unsigned, since a file may hold the lowest number.
+    int inFile = static_cast<int>(static_cast<unsigned>(value) + 1U);
+    if (Exchange({key}, inFile)) value = static_cast<int>(static_cast<unsigned>(inFile) - 1U);
   }
   /// An absent key reads as 0, false or an empty text.
   template <class Value>

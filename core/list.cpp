@@ -32,14 +32,9 @@ void CYbSEKvfListBaseInterface::ForwardToItems(int level,
 void CYbSEKvfListBaseInterface::SetItemCount(int count, int level) {
   if (level != 1) return ForwardToItems(level, [count](auto& list, int below) { list.SetItemCount(count, below); });
   while (GetItemCount() > std::max(count, 0)) children_.pop_back();
-  while (GetItemCount() < count) {
-    children_.push_back(NewItemNode());
-    // All items of a touched list are touched already, but for the new one and what it holds.
-    if (GetHasBeenTouched() == 1) {
-      children_.back()->Touch();
-      children_.back()->TouchAllChildren();
-    }
-  }
+  const bool grows = GetItemCount() < count;
+  while (GetItemCount() < count) children_.push_back(NewItemNode());
+  if (grows && GetHasBeenTouched() == 1) TouchAllChildren();
   for (const auto& [list, listLevel] : syncedLists_) list->SetItemCount(count, listLevel);
 }
 
@@ -107,7 +102,7 @@ void CYbSEKvfListBaseInterface::Load(KvfNode* parentSection) {
   KvfNode* section = GetSectionUsed() && !GetSectionName().empty() ? FindSection(parentSection) : nullptr;
   if (!section) return;
   int missing = 0;
-  for (int number = 1; number <= GetItemCount(); ++number) missing += !HadSection(*GetItemNode(number));
+  for (int number = 1; number <= GetItemCount(); ++number) missing += MissedSection(*GetItemNode(number));
   if (missing > 0)
     kvfAddNote(section, kItemCountKey,
                fmt::format("{} of {} items have no section: they are at their defaults", missing, GetItemCount()));

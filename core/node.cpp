@@ -7,6 +7,7 @@
 
 #include <fmt/format.h>
 
+#include "core/kvf_writer.h"
 #include "platform/os.h"
 
 namespace tervane {
@@ -110,15 +111,14 @@ void CYbSEKvfBase::SetHelp(std::string helpFile, std::string page) {
 
 void CYbSEKvfBase::Load(KvfNode* parentSection) {
   if (!GetSectionUsed()) return;
-  KvfNode* section = parentSection;
-  if (GetSectionName().empty()) {
-    if (parent_) touched_ = parent_->touched_;
-  } else {
-    section = FindSection(parentSection);
-    hadSection_ = section != nullptr;
-    if (!section) return;
+  const bool hasSection = !GetSectionName().empty();
+  KvfNode* section = hasSection ? FindSection(parentSection) : parentSection;
+  missedSection_ = section == nullptr;
+  if (!section) return;
+  if (hasSection)
     ReadTouched(section);
-  }
+  else if (parent_)
+    touched_ = parent_->touched_;
   LoadSize(section);
   ReadData(section);
   LoadChildren(section);
@@ -138,7 +138,9 @@ void CYbSEKvfBase::LoadChildren(KvfNode* section) {
   for (std::size_t place = 0; place < children_.size(); ++place) {
     CYbSEKvfBase& child = *children_[place];
     const std::string& name = child.GetSectionName();
-    if (!name.empty() && name.find("%d") == std::string::npos) child.sectionInstance_ = ++instances[name];
+    const bool isNumbered = name.find("%d") != std::string::npos;
+    // A child without a section in the file takes no place.
+    if (!name.empty() && !isNumbered && child.GetSectionUsed()) child.sectionInstance_ = ++instances[name];
     child.Load(section);
   }
 }
@@ -153,9 +155,27 @@ void CYbSEKvfBase::Save(KvfFile* file) {
     SaveSize(file);
   }
   WriteData(file);
+  SaveChildren(file);
+  if (hasSection) kvfEndSection(file);
+}
+
+void CYbSEKvfBase::SaveChildren(KvfFile* file) {
   for (const auto& property : properties_) property->Save(file);
   for (const auto& child : children_) child->Save(file);
-  if (hasSection) kvfEndSection(file);
+}
+
+void CYbSEKvfGroupBase::Load(KvfNode* parentSection) {
+  if (!GetSectionName().empty())
+    CYbSEKvfBase::Load(parentSection);
+  else if (GetSectionUsed() && parentSection)
+    LoadChildren(parentSection);
+}
+
+void CYbSEKvfGroupBase::Save(KvfFile* file) {
+  if (!GetSectionName().empty())
+    CYbSEKvfBase::Save(file);
+  else if (GetSectionUsed())
+    SaveChildren(file);
 }
 
 void CYbSEKvfBase::ReadData(KvfNode* section) {
@@ -174,10 +194,11 @@ void CYbSEKvfBase::DescribeKeys(std::vector<KeyInfo>& keys) {
 }
 
 void CYbSEKvfBase::TouchAllChildren() {
-  for (const auto& child : children_) {
-    child->Touch();
-    child->TouchAllChildren();
-  }
+  for (const auto* nodes : {&properties_, &children_})
+    for (const auto& node : *nodes) {
+      node->Touch();
+      node->TouchAllChildren();
+    }
 }
 
 // ---- Taking part and validation
@@ -196,6 +217,8 @@ int CYbSEKvfBase::Validate() {
                return finding.severity == Severity::Error;
              });
   }
+  for (const auto& property : properties_)
+    if (!property->Validate()) valid_ = 0;
   for (std::size_t place = 0; place < children_.size(); ++place)
     if (!children_[place]->Validate()) valid_ = 0;
   return valid_;
@@ -223,6 +246,7 @@ CYbSEKvfGlobalBase::CYbSEKvfGlobalBase(std::string targetName)
 CYbSEKvfGlobalBase::~CYbSEKvfGlobalBase() {
   // Nodes look each other up while they die: from here on nobody is found.
   importantNodes_.clear();
+  properties_.clear();
   children_.clear();
 }
 
@@ -300,10 +324,12 @@ std::string ClassNameOf(const CYbSEKvfBase& node) {
 // ---- Overview
 
 int CYbSEKvfBase::AddToOverview(std::vector<OverviewLine>& lines, int level) {
-  std::vector<KeyInfo> keys;
-  DescribeKeys(keys);
-  for (const KeyInfo& key : keys)
-    if (key.written) lines.push_back({GetTitle(), level, fmt::format("{} = {}", key.key, key.defaultValue)});
+  KvfFile written;
+  kvfAddTarget(&written, "Keys");
+  WriteData(&written);
+  for (const KvfNode* node = written.Cursor().firstChild; node; node = node->next)
+    if (node->IsKeyword())
+      lines.push_back({GetTitle(), level, fmt::format("{} = {}", node->Name(), KvfValuesText(*node))});
   return 1;
 }
 

@@ -165,6 +165,7 @@ class CYbSEKvfBase {
   /// The node's section in the parent's section, marked as looked up; null when there is none.
   KvfNode* FindSection(KvfNode* parentSection) const;
   void LoadChildren(KvfNode* section);
+  void SaveChildren(KvfFile* file);
   CYbSEKvfBase* ImportantNode(std::string_view name) const;
 
   // For lists, whose items stand behind the plain children.
@@ -172,7 +173,7 @@ class CYbSEKvfBase {
   std::size_t plainChildren_ = 0;
   /// Place of a child in `children_`, or -1.
   std::ptrdiff_t PlaceOf(const CYbSEKvfBase* child) const;
-  bool HadSection(const CYbSEKvfBase& child) const { return child.hadSection_; }
+  bool MissedSection(const CYbSEKvfBase& child) const { return child.missedSection_; }
 
  private:
   friend class CYbSEKvfGlobalBase;
@@ -185,9 +186,9 @@ class CYbSEKvfBase {
   int touched_ = 0;
   int sectionNumber_ = -1;
   int sectionUsed_ = 1;
-  int sectionInstance_ = 1;   ///< Which of several like sections of the parent is this node's.
-  bool hadSection_ = false;   ///< The latest load found the section.
-  bool isImportant_ = false;  ///< Registered at the root at least once.
+  int sectionInstance_ = 1;     ///< Which of several like sections of the parent is this node's.
+  bool missedSection_ = false;  ///< The latest load looked for the section and did not find it.
+  bool isImportant_ = false;    ///< Registered at the root at least once.
   int valid_ = 1;
   mutable std::uint32_t placeHint_ = 0;  ///< Place among the siblings when last asked; checked before use.
 };
@@ -196,6 +197,10 @@ class CYbSEKvfBase {
 class CYbSEKvfGroupBase : public CYbSEKvfBase {
  public:
   using CYbSEKvfBase::CYbSEKvfBase;
+
+  /// A group without a section has no data of its own: its children work in its parent's section.
+  void Load(KvfNode* parentSection) override;
+  void Save(KvfFile* file) override;
 };
 
 class CTvnKvfGroupBase : public CYbSEKvfGroupBase {

@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "simspec/extra_params.h"
 
-#include "platform/paths.h"
 #include "simspec/basic_parameters.h"
 
 namespace tervane {
@@ -35,8 +34,6 @@ void CExtraParamsItemKvf::ExchangeKeys(KeyExchange& keys) {
     for (const int kind : {kFloat, kInteger, kBool, kText, kFilename}) exchangeValue(kind);
   else
     exchangeValue(Type);
-  // A folder is no file.
-  if (keys.IsReading() && EndsInSeparator(FilenameValue.Text())) FilenameValue = FileName();
 }
 
 int CExtraParamsKvf::GetSectionUsed() const {

@@ -105,9 +105,9 @@ void CModModelCompKvf::ExchangeKeys(KeyExchange& keys) {
       "Recharge_ModelType", [&] { return knowsRechargeType ? Recharge_ModelType : 0; },
       [&](int type) { Recharge_ModelType = type; });
   keys("Subsurface", Subsurface);
-  keys.Custom(
-      "Subsurface_ModelType", [&] { return keys.IsReading() ? subsurfaceModelType_ : GetSubsurfaceModelType(); },
-      [&](int type) { TakeSubsurfaceModelType(type); });
+  int subsurfaceModelType = keys.IsReading() ? 1 : GetSubsurfaceModelType();  // An absent key reads as 1.
+  keys("Subsurface_ModelType", subsurfaceModelType);
+  if (keys.IsReading()) TakeSubsurfaceModelType(subsurfaceModelType);
   keys("Modflow2000_BCFType", Modflow2000_BCFType);
   keys("ET", ET);
 }

@@ -43,11 +43,10 @@ struct HotStartData {
   CYbDateTimeSpan interval;
 };
 
-bool ReadDate(KvfNode* section, const char* key, CYbDateTime& date) {
+CYbDateTime ReadDate(KvfNode* section, const char* key) {
   int year = 0, month = 1, day = 1, hour = 0, minute = 0;
   kvfGetListParam(section, key, 1, "iiiii", &year, &month, &day, &hour, &minute);
-  date = CYbDateTime(year, month, day, hour, minute);
-  return date.IsValid();
+  return {year, month, day, hour, minute};
 }
 
 bool ReadHotStartData(KvfFile* file, HotStartData& data) {
@@ -63,7 +62,9 @@ bool ReadHotStartData(KvfFile* file, HotStartData& data) {
   if (hasData != 1) return false;
   kvfGetParam(period, "HotstartStoringTimestep_Hrs", &hours, 1, 1);
   data.interval = std::isfinite(hours) ? CYbDateTimeSpan::Days(hours / 24) : CYbDateTimeSpan{};
-  return ReadDate(period, "StartDate", data.start) && ReadDate(period, "EndDate", data.end);
+  data.start = ReadDate(period, "StartDate");
+  data.end = ReadDate(period, "EndDate");
+  return true;
 }
 
 }  // namespace
