@@ -53,7 +53,8 @@ struct KvfNode {
   std::uint8_t blanksAfter = 0;
   KvfNode* next = nullptr;  ///< The following node of the same parent.
   KvfParam* params = nullptr;
-  std::uint32_t count = 0;  ///< Number of parameters of a keyword, of children of a section.
+  std::uint32_t count = 0;     ///< Number of parameters of a keyword, of children of a section.
+  std::uint32_t capacity = 0;  ///< Number of parameters of a keyword that have a place.
 
   std::string_view Name() const { return {nameText, nameLength}; }
   /// The name with the blanks that surround it in the file.
@@ -184,6 +185,7 @@ struct KvfFile {
   KvfIndex& IndexOf(KvfSection& section);
 
  private:
+  KvfSection* NewSection(KvfKind kind, std::string_view writtenName);
   void SetName(KvfNode& node, std::string_view writtenName);
 
   std::deque<KvfIndex> indices_;
