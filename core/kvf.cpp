@@ -346,9 +346,18 @@ int kvfGetListParam(KvfNode* section, std::string_view key, int instance, const 
 
 namespace {
 
+/// Has the writer refuse a file with a text that no escape stands for.
+void RefuseNul(KvfFile& file, std::string_view text, std::string_view what) {
+  if (text.find('\0') != std::string_view::npos)
+    file.unwritable = fmt::format("{} in {} holds a NUL", what, file.Cursor().Name());
+}
+
 int OpenSection(KvfFile* file, KvfKind kind, std::string_view name) {
   if (!file || Trimmed(name).empty() || (kind == KvfKind::Target) != file->open.empty()) return 0;
+  RefuseNul(*file, name, "a name");
   file->open.push_back(file->AddSection(file->Cursor(), kind, name));
+  if (file->open.size() > kKvfDeepestNesting)
+    file->unwritable = fmt::format("section {} is nested deeper than {}", Trimmed(name), kKvfDeepestNesting);
   file->currentKeyword = nullptr;
   return 1;
 }
@@ -360,6 +369,7 @@ KvfParam* NextParam(KvfFile* file, KvfType type) {
 
 int AddText(KvfFile* file, KvfType type, std::string_view value) {
   if (!file || !file->currentKeyword) return 0;
+  RefuseNul(*file, value, file->currentKeyword->Name());
   // The text goes first, so that the parameters of a keyword can lie side by side.
   KvfParam text;
   file->SetText(text, value);
@@ -382,6 +392,7 @@ int kvfEndSection(KvfFile* file) {
 
 int kvfAddKeyword(KvfFile* file, std::string_view name) {
   if (!file || file->open.empty() || Trimmed(name).empty()) return 0;
+  RefuseNul(*file, name, "a name");
   file->currentKeyword = file->AddKeyword(file->Cursor(), name);
   return 1;
 }

@@ -161,6 +161,7 @@ struct KvfFile {
   // Writing mode.
   std::vector<KvfSection*> open;  ///< The cursor: the open sections, outermost first; `top` is not among them.
   KvfNode* currentKeyword = nullptr;
+  std::string unwritable;  ///< What was added although no file can hold it; empty when all is well.
 
   KvfSection& Cursor() { return open.empty() ? top : *open.back(); }
   KvfSection* AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName);
