@@ -466,16 +466,20 @@ void kvfSetCustomResultFolder(KvfFile* file, int useCustomFolder, std::string_vi
 
 const char* kvfGetProjectResultRoot(KvfFile* file) {
   KvfNode* target = kvfTargetByNameNum(file, kSystemTarget, 1);
-  KvfParam* root = kvfParamByNum(kvfKeywordByNameNum(target, kRootKey, 1), 1);
-  return kvfIsFilename(root) ? kvfGetFilename(root) : nullptr;
+  KvfNode* keyword = kvfKeywordByNameNum(target, kRootKey, 1);
+  KvfParam* root = kvfParamByNum(keyword, 1);
+  if (kvfIsFilename(root)) return kvfGetFilename(root);
+  if (keyword) NoteType(target, *keyword, root, KvfType::Filename);
+  return nullptr;
 }
 
 int kvfGetCustomResultFolder(KvfFile* file, int* useCustomFolder, std::string* folder) {
   KvfNode* target = kvfTargetByNameNum(file, kSystemTarget, 1);
   const int hasFlag = kvfGetParam(target, kUseCustomKey, useCustomFolder, 1, 1);
-  KvfParam* stored = kvfParamByNum(kvfKeywordByNameNum(target, kCustomKey, 1), 1);
-  if (kvfIsFilename(stored)) *folder = stored->Text();
-  return hasFlag || kvfIsFilename(stored);
+  std::string resolved;  // Asked for its note on a wrong type; the text as stored is what the caller gets.
+  if (!kvfGetParamFilename(target, kCustomKey, &resolved, 1, 1)) return hasFlag;
+  *folder = FindKvfNode(*AsSection(target), true, kCustomKey)->params[0].Text();
+  return 1;
 }
 
 namespace {
@@ -487,7 +491,7 @@ std::string ResultFolderOf(KvfFile& file) {
   if (useCustom && !custom.empty()) return ResolvedPath(custom, file.folder);
   const char* root = kvfGetProjectResultRoot(&file);
   const std::string base = root && *root ? ResolvedPath(root, file.folder) : file.folder;
-  return fmt::format("{}/{}_results", base, BaseNameOf(file.path));
+  return ResolvedPath(fmt::format("{}_results", BaseNameOf(file.path)), base);
 }
 
 void CopyPath(const std::string& path, char* buffer) {
@@ -498,7 +502,7 @@ void CopyPath(const std::string& path, char* buffer) {
 }  // namespace
 
 const char* kvfGetResultFilename(KvfParam* param) {
-  if (!kvfIsFilename(param) || EndsInSeparator(param->Text()) || param->length == 0) return nullptr;
+  if (!kvfIsFilename(param) || FileNameOf(param->Text()).empty()) return nullptr;
   const char* text = TerminatedText(*param);
   return text + (FileNameOf(text).data() - text);
 }
@@ -506,7 +510,7 @@ const char* kvfGetResultFilename(KvfParam* param) {
 void kvfGetResultFilenamePath(KvfParam* param, char* buffer) {
   KvfFile* file = OwnerOf(param);
   const char* name = kvfGetResultFilename(param);
-  CopyPath(file && name ? fmt::format("{}/{}", ResultFolderOf(*file), name) : std::string(), buffer);
+  CopyPath(file && name ? ResolvedPath(name, ResultFolderOf(*file)) : std::string(), buffer);
 }
 
 void kvfGetResultFolderPath(KvfParam* param, char* buffer) {
