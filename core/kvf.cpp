@@ -346,9 +346,18 @@ int kvfGetListParam(KvfNode* section, std::string_view key, int instance, const 
 
 namespace {
 
+/// Has the writer refuse a file with a text that no escape stands for.
+void RefuseNul(KvfFile& file, std::string_view text, std::string_view what) {
+  if (text.find('\0') != std::string_view::npos)
+    file.unwritable = fmt::format("{} in {} holds a NUL", what, file.Cursor().Name());
+}
+
 int OpenSection(KvfFile* file, KvfKind kind, std::string_view name) {
   if (!file || Trimmed(name).empty() || (kind == KvfKind::Target) != file->open.empty()) return 0;
+  RefuseNul(*file, name, "a name");
   file->open.push_back(file->AddSection(file->Cursor(), kind, name));
+  if (file->open.size() > kKvfDeepestNesting)
+    file->unwritable = fmt::format("section {} is nested deeper than {}", Trimmed(name), kKvfDeepestNesting);
   file->currentKeyword = nullptr;
   return 1;
 }
@@ -360,6 +369,7 @@ KvfParam* NextParam(KvfFile* file, KvfType type) {
 
 int AddText(KvfFile* file, KvfType type, std::string_view value) {
   if (!file || !file->currentKeyword) return 0;
+  RefuseNul(*file, value, file->currentKeyword->Name());
   // The text goes first, so that the parameters of a keyword can lie side by side.
   KvfParam text;
   file->SetText(text, value);
@@ -382,6 +392,7 @@ int kvfEndSection(KvfFile* file) {
 
 int kvfAddKeyword(KvfFile* file, std::string_view name) {
   if (!file || file->open.empty() || Trimmed(name).empty()) return 0;
+  RefuseNul(*file, name, "a name");
   file->currentKeyword = file->AddKeyword(file->Cursor(), name);
   return 1;
 }
@@ -455,16 +466,20 @@ void kvfSetCustomResultFolder(KvfFile* file, int useCustomFolder, std::string_vi
 
 const char* kvfGetProjectResultRoot(KvfFile* file) {
   KvfNode* target = kvfTargetByNameNum(file, kSystemTarget, 1);
-  KvfParam* root = kvfParamByNum(kvfKeywordByNameNum(target, kRootKey, 1), 1);
-  return kvfIsFilename(root) ? kvfGetFilename(root) : nullptr;
+  KvfNode* keyword = kvfKeywordByNameNum(target, kRootKey, 1);
+  KvfParam* root = kvfParamByNum(keyword, 1);
+  if (kvfIsFilename(root)) return kvfGetFilename(root);
+  if (keyword) NoteType(target, *keyword, root, KvfType::Filename);
+  return nullptr;
 }
 
 int kvfGetCustomResultFolder(KvfFile* file, int* useCustomFolder, std::string* folder) {
   KvfNode* target = kvfTargetByNameNum(file, kSystemTarget, 1);
   const int hasFlag = kvfGetParam(target, kUseCustomKey, useCustomFolder, 1, 1);
-  KvfParam* stored = kvfParamByNum(kvfKeywordByNameNum(target, kCustomKey, 1), 1);
-  if (kvfIsFilename(stored)) *folder = stored->Text();
-  return hasFlag || kvfIsFilename(stored);
+  std::string resolved;  // Asked for its note on a wrong type; the text as stored is what the caller gets.
+  if (!kvfGetParamFilename(target, kCustomKey, &resolved, 1, 1)) return hasFlag;
+  *folder = FindKvfNode(*AsSection(target), true, kCustomKey)->params[0].Text();
+  return 1;
 }
 
 namespace {
@@ -476,7 +491,7 @@ std::string ResultFolderOf(KvfFile& file) {
   if (useCustom && !custom.empty()) return ResolvedPath(custom, file.folder);
   const char* root = kvfGetProjectResultRoot(&file);
   const std::string base = root && *root ? ResolvedPath(root, file.folder) : file.folder;
-  return fmt::format("{}/{}_results", base, BaseNameOf(file.path));
+  return ResolvedPath(fmt::format("{}_results", BaseNameOf(file.path)), base);
 }
 
 void CopyPath(const std::string& path, char* buffer) {
@@ -487,7 +502,7 @@ void CopyPath(const std::string& path, char* buffer) {
 }  // namespace
 
 const char* kvfGetResultFilename(KvfParam* param) {
-  if (!kvfIsFilename(param) || EndsInSeparator(param->Text()) || param->length == 0) return nullptr;
+  if (!kvfIsFilename(param) || FileNameOf(param->Text()).empty()) return nullptr;
   const char* text = TerminatedText(*param);
   return text + (FileNameOf(text).data() - text);
 }
@@ -495,7 +510,7 @@ const char* kvfGetResultFilename(KvfParam* param) {
 void kvfGetResultFilenamePath(KvfParam* param, char* buffer) {
   KvfFile* file = OwnerOf(param);
   const char* name = kvfGetResultFilename(param);
-  CopyPath(file && name ? fmt::format("{}/{}", ResultFolderOf(*file), name) : std::string(), buffer);
+  CopyPath(file && name ? ResolvedPath(name, ResultFolderOf(*file)) : std::string(), buffer);
 }
 
 void kvfGetResultFolderPath(KvfParam* param, char* buffer) {

@@ -111,9 +111,12 @@ class Parser {
     constexpr std::ptrdiff_t behind = 20;
     const bool cutBefore = place - counted > before;
     const bool cutBehind = lineEnd - place > behind;
-    const std::string_view excerpt(cutBefore ? place - before : std::min(counted, place),
-                                   cutBehind ? place + behind : lineEnd);
-    const std::string quoted = Shown(Trimmed(excerpt));
+    const char* excerpt = cutBefore ? place - before : std::min(counted, place);
+    const char* excerptEnd = cutBehind ? place + behind : lineEnd;
+    const auto isInsideCharacter = [](char c) { return (static_cast<unsigned char>(c) & 0xC0) == 0x80; };
+    for (int i = 0; i < 3 && cutBefore && isInsideCharacter(*excerpt); ++i) ++excerpt;
+    for (int i = 0; i < 3 && cutBehind && excerptEnd != lineEnd && isInsideCharacter(*excerptEnd); ++i) ++excerptEnd;
+    const std::string quoted = Shown(Trimmed({excerpt, static_cast<std::size_t>(excerptEnd - excerpt)}));
     error.message = fmt::format("{}:{}: ", error.line, error.column);
     if (!quoted.empty())
       error.message += fmt::format("{}{}{}: ", cutBefore ? "..." : "", quoted, cutBehind ? "..." : "");

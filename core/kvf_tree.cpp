@@ -140,11 +140,16 @@ void KvfFile::SetName(KvfNode& node, std::string_view writtenName) {
   node.blanksAfter = static_cast<std::uint8_t>(after);
 }
 
-KvfSection* KvfFile::AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName) {
+KvfSection* KvfFile::NewSection(KvfKind kind, std::string_view writtenName) {
   auto* section = arena.New<KvfSection>();
   section->kind = kind;
   section->file = this;
   SetName(*section, writtenName);
+  return section;
+}
+
+KvfSection* KvfFile::AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName) {
+  KvfSection* section = NewSection(kind, writtenName);
   Append(parent, *section);
   return section;
 }
@@ -158,12 +163,18 @@ KvfNode* KvfFile::AddKeyword(KvfSection& parent, std::string_view writtenName) {
 }
 
 KvfParam& KvfFile::AddParam(KvfNode& keyword, KvfType type) {
-  const std::size_t oldSize = keyword.count * sizeof(KvfParam);
-  const std::size_t newSize = oldSize + sizeof(KvfParam);
-  if (keyword.count == 0 || !arena.Extend(keyword.params, oldSize, newSize)) {
-    auto* moved = static_cast<KvfParam*>(arena.Allocate(newSize, alignof(KvfParam)));
-    std::uninitialized_copy_n(keyword.params, keyword.count, moved);
-    keyword.params = moved;
+  if (keyword.count == keyword.capacity) {
+    const std::size_t oldSize = keyword.capacity * sizeof(KvfParam);
+    if (keyword.capacity > 0 && arena.Extend(keyword.params, oldSize, oldSize + sizeof(KvfParam))) {
+      ++keyword.capacity;
+    } else {
+      // Texts may lie behind: doubling keeps a long list of them linear.
+      keyword.capacity = std::max(2 * keyword.capacity, std::uint32_t{1});
+      void* memory = arena.Allocate(keyword.capacity * sizeof(KvfParam), alignof(KvfParam));
+      auto* moved = static_cast<KvfParam*>(memory);
+      std::uninitialized_copy_n(keyword.params, keyword.count, moved);
+      keyword.params = moved;
+    }
   }
   auto* param = new (&keyword.params[keyword.count++]) KvfParam;
   param->type = type;
@@ -177,14 +188,18 @@ void KvfFile::SetText(KvfParam& param, std::string_view value) {
 }
 
 void KvfFile::CopyChildren(const KvfSection& from, KvfSection& to) {
-  for (const KvfNode* node = from.firstChild; node; node = node->next) {
+  // `to` may be `from` or lie in it: a copy must not be copied again.
+  const KvfNode* const last = from.lastChild;
+  for (const KvfNode* node = from.firstChild; node; node = node == last ? nullptr : node->next) {
     if (const KvfSection* section = AsSection(node)) {
-      CopyChildren(*section, *AddSection(to, KvfKind::Section, section->WrittenName()));
+      KvfSection* copy = NewSection(KvfKind::Section, section->WrittenName());
+      CopyChildren(*section, *copy);
+      Append(to, *copy);
       continue;
     }
     KvfNode* copy = AddKeyword(to, node->WrittenName());
     copy->params = static_cast<KvfParam*>(arena.Allocate(node->count * sizeof(KvfParam), alignof(KvfParam)));
-    copy->count = node->count;
+    copy->count = copy->capacity = node->count;
     for (std::uint32_t i = 0; i < node->count; ++i) {
       auto* param = new (&copy->params[i]) KvfParam(node->params[i]);
       param->lookedUp = false;

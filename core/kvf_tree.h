@@ -53,7 +53,8 @@ struct KvfNode {
   std::uint8_t blanksAfter = 0;
   KvfNode* next = nullptr;  ///< The following node of the same parent.
   KvfParam* params = nullptr;
-  std::uint32_t count = 0;  ///< Number of parameters of a keyword, of children of a section.
+  std::uint32_t count = 0;     ///< Number of parameters of a keyword, of children of a section.
+  std::uint32_t capacity = 0;  ///< Number of parameters of a keyword that have a place.
 
   std::string_view Name() const { return {nameText, nameLength}; }
   /// The name with the blanks that surround it in the file.
@@ -160,6 +161,7 @@ struct KvfFile {
   // Writing mode.
   std::vector<KvfSection*> open;  ///< The cursor: the open sections, outermost first; `top` is not among them.
   KvfNode* currentKeyword = nullptr;
+  std::string unwritable;  ///< What was added although no file can hold it; empty when all is well.
 
   KvfSection& Cursor() { return open.empty() ? top : *open.back(); }
   KvfSection* AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName);
@@ -184,6 +186,7 @@ struct KvfFile {
   KvfIndex& IndexOf(KvfSection& section);
 
  private:
+  KvfSection* NewSection(KvfKind kind, std::string_view writtenName);
   void SetName(KvfNode& node, std::string_view writtenName);
 
   std::deque<KvfIndex> indices_;

@@ -171,6 +171,10 @@ void AppendKvfNodes(const KvfSection& section, int level, std::string& text) {
 }
 
 bool WriteKvfText(const KvfFile& file, std::string& text, std::string& error) {
+  if (!file.unwritable.empty()) {
+    error = file.unwritable;
+    return false;
+  }
   if (const std::string bad = FindBadText(file.top); !bad.empty()) {
     error = fmt::format("{} is no UTF-8 text", bad);
     return false;

@@ -9,8 +9,8 @@
 
 namespace tervane {
 
-/// The whole file as text, the header in front. False, with the reason in `error`, when a text in it is no UTF-8: such
-/// a file could not be read again.
+/// The whole file as text, the header in front. False, with the reason in `error`, when a text in it is no UTF-8 or
+/// holds a NUL, or sections are nested too deep: such a file could not be read again.
 bool WriteKvfText(const KvfFile& file, std::string& text, std::string& error);
 
 /// The children of a section as text, indented by `level` steps.

@@ -67,7 +67,7 @@ SetupPath ParseSetupPath(std::string_view text) {
     if (!path.error.empty() || at == text.size()) break;
     const char separator = text[at++];
     if (inKey || (separator != '/' && separator != ':')) {
-      path.error = fmt::format("'{}' was not expected at place {}", separator, at);
+      path.error = fmt::format("{} was not expected at place {}", text.substr(at - 1), at);
     } else if (separator == ':') {
       inKey = true;
     } else if (at == text.size()) {

@@ -12,14 +12,14 @@ namespace {
 bool ExchangeArea(KeyExchange& keys, const std::string& name, DataArea& area) {
   int undefined = keys.IsReading() ? 1 : area.IsUndefined();
   keys(name + "Undefined", undefined);
-  DataArea read;
-  DataArea& target = keys.IsReading() ? read : area;
-  keys(name + "_X0", target.x0);
-  keys(name + "_Y0", target.y0);
-  keys(name + "_X1", target.x1);
-  keys(name + "_Y1", target.y1);
+  // The zeros of an undefined area may bear a sign, which reading would lose: they are written without.
+  DataArea inFile = keys.IsReading() || undefined != 0 ? DataArea() : area;
+  keys(name + "_X0", inFile.x0);
+  keys(name + "_Y0", inFile.y0);
+  keys(name + "_X1", inFile.x1);
+  keys(name + "_Y1", inFile.y1);
   if (!keys.IsReading() || undefined != 0) return false;
-  area = read;
+  area = inFile;
   return true;
 }
 
