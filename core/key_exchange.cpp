@@ -43,11 +43,11 @@ bool KeyExchange::Reads(const Rule& rule) {
   return false;
 }
 
-void KeyExchange::Describe(const Rule& rule, std::string_view type) {
+void KeyExchange::Describe(const Rule& rule, std::string_view type, const void* member) {
   const KvfNode* keyword = file_->currentKeyword;
   if (!keyword) return;
   keys_->push_back({std::string(rule.key), std::string(type), rule.written ? KvfValuesText(*keyword) : std::string(),
-                    rule.since, rule.until, rule.written});
+                    rule.since, rule.until, rule.written, member});
 }
 
 void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
@@ -60,7 +60,7 @@ void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
     return;
   }
   kvfPutListParam(file_, key, "iii", year, month, day);
-  if (keys_) Describe({key}, "day");
+  if (keys_) Describe({key}, "day", &value);
 }
 
 void KeyExchange::Count(std::string_view key, CYbSEKvfListBaseInterface& list) {

@@ -20,11 +20,12 @@ struct KeyInfo {
   static constexpr int kNoLimit = std::numeric_limits<int>::max();
 
   std::string key;
-  std::string type;          ///< "int", "float", "double", "bool", "string", "filename", "date", "day".
-  std::string defaultValue;  ///< As the file holds it.
-  int since = -1;            ///< First document version in which the key is read.
-  int until = kNoLimit;      ///< Last document version in which the key is read.
-  bool written = true;       ///< False for keys of old files.
+  std::string type;              ///< "int", "float", "double", "bool", "string", "filename", "date", "day".
+  std::string defaultValue;      ///< As the file holds it.
+  int since = -1;                ///< First document version in which the key is read.
+  int until = kNoLimit;          ///< Last document version in which the key is read.
+  bool written = true;           ///< False for keys of old files.
+  const void* member = nullptr;  ///< Address of the member that holds the value; of a passing value, no member's.
 };
 
 /// One walk over the keys of a node. A node declares its keys once, in `ExchangeKeys`, in the order of the file; the
@@ -106,12 +107,12 @@ class KeyExchange {
     if (IsReading()) return Reads(rule) && Read(rule.key, value);
     if (IsWriting() && !rule.written) return false;
     Write(rule.key, value);
-    if (keys_) Describe(rule, TypeName(value));
+    if (keys_) Describe(rule, TypeName(value), &value);
     return false;
   }
   /// Whether the rule reads its key in this document; a key that is skipped is marked as known.
   bool Reads(const Rule& rule);
-  void Describe(const Rule& rule, std::string_view type);
+  void Describe(const Rule& rule, std::string_view type, const void* member);
 
   template <class Number>
   bool Read(std::string_view key, Number& value) {

@@ -163,7 +163,7 @@ TEST(CommandLine, APlaceThatIsNotThereIsToldWithWhatComesNear) {
                {"SimSpec", "a key was expected"},
                {"SimSpec#2:ModelType", "there is no SimSpec#2 here"},
                {"SimSpec/", "a name was expected"},
-               {"SimSpec:A:B", "':' was not expected"},
+               {"SimSpec:A:B", ":B was not expected at place 10"},
                {"\"SimSpec", "the closing \" of a name is missing"}};
   for (const auto& c : cases) {
     const Outcome outcome = Tervane({"get", file, c.path});
