@@ -1,0 +1,97 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Small trees of nodes, and the road between them and a text.
+#pragma once
+
+#include <functional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "core/kvf_parser.h"
+#include "core/kvf_writer.h"
+#include "core/node.h"
+#include "platform/text.h"
+
+namespace tervane::test {
+
+class Root : public CYbSEKvfGlobalBase {
+ public:
+  Root() : CYbSEKvfGlobalBase("T") {}
+
+  int WritesUsedFlags = 0;
+  int Version = -1;
+
+  int WriteUsedFlags() override { return WritesUsedFlags; }
+  int ReadDocVersion() const override { return Version; }
+};
+
+/// A node with one key, over any base.
+template <class Base>
+class ValueNodeOn : public Base {
+ public:
+  explicit ValueNodeOn(CYbSEKvfBase* parent) : Base(parent) {}
+  ValueNodeOn(std::string section, CYbSEKvfBase* parent) : Base("Title of " + section, section, parent) {}
+
+  int Value = 7;
+  int Used = 1;
+  int DataIsValid = 1;  ///< What `ValidateData` gives.
+  std::vector<Finding> Finds;
+
+  int IsDlgUsedInSetup() override { return Used; }
+  int ValidateData() override {
+    for (const Finding& finding : Finds)
+      finding.severity == Severity::Error ? this->AddError(finding.text, finding.key)
+                                          : this->AddWarning(finding.text, finding.key);
+    return DataIsValid;
+  }
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override { keys("Value", Value); }
+};
+using ValueNode = ValueNodeOn<CYbSEKvfBase>;
+using ValueGroup = ValueNodeOn<CYbSEKvfGroupBase>;
+
+/// What the tree would write, without the target's lines and without indentation.
+inline std::vector<std::string> SavedLines(CYbSEKvfGlobalBase& root) {
+  KvfFile* file = kvfCreate();
+  root.Save(file);
+  std::string text, error;
+  WriteKvfText(*file, text, error);
+  kvfClose(&file);
+  std::vector<std::string> lines;
+  for (std::size_t start = 0; start < text.size();) {
+    const std::size_t end = text.find('\n', start);
+    const std::string line = text.substr(start, end - start);
+    lines.push_back(line.substr(line.find_first_not_of(' ')));
+    start = end + 1;
+  }
+  return lines.size() < 2 ? lines : std::vector<std::string>(lines.begin() + 1, lines.end() - 1);
+}
+
+/// Loads the content of the root's target; gives the notes as "section/section:Key: text".
+/// A section may stand on one line: a line ends before and behind each brace that closes one.
+inline std::vector<std::string> LoadText(CYbSEKvfGlobalBase& root, const std::string& content) {
+  KvfFile* file = kvfCreate();
+  file->text = FileContent::Of(Replaced("target " + root.GetTargetName() + " {\n" + content + "}", "}", "\n}\n"));
+  std::vector<std::string> notes;
+  if (ParseKvf(*file)) {
+    root.Load(&file->top);
+    for (const KvfPlacedNote& note : CollectNotes(*file))
+      notes.push_back(note.path + ":" + note.key + ": " + note.text);
+  } else {
+    notes.push_back(file->syntaxError.message);
+  }
+  kvfClose(&file);
+  return notes;
+}
+
+inline std::vector<std::string> SectionNames(const CYbSEKvfBase& parent) {
+  std::vector<std::string> names;
+  for (CYbSEKvfBase* child = parent.GetFirstChild(); child; child = parent.GetNextChild(child))
+    names.push_back(child->FormattedSectionName());
+  return names;
+}
+
+}  // namespace tervane::test
