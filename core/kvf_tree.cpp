@@ -162,23 +162,17 @@ KvfNode* KvfFile::AddKeyword(KvfSection& parent, std::string_view writtenName) {
   return keyword;
 }
 
-KvfParam& KvfFile::AddParam(KvfNode& keyword, KvfType type) {
-  if (keyword.count == keyword.capacity) {
-    const std::size_t oldSize = keyword.capacity * sizeof(KvfParam);
-    if (keyword.capacity > 0 && arena.Extend(keyword.params, oldSize, oldSize + sizeof(KvfParam))) {
-      ++keyword.capacity;
-    } else {
-      // Texts may lie behind: doubling keeps a long list of them linear.
-      keyword.capacity = std::max(2 * keyword.capacity, std::uint32_t{1});
-      void* memory = arena.Allocate(keyword.capacity * sizeof(KvfParam), alignof(KvfParam));
-      auto* moved = static_cast<KvfParam*>(memory);
-      std::uninitialized_copy_n(keyword.params, keyword.count, moved);
-      keyword.params = moved;
-    }
+void KvfFile::MakeRoomForParam(KvfNode& keyword) {
+  const std::size_t oldSize = keyword.capacity * sizeof(KvfParam);
+  if (keyword.capacity > 0 && arena.Extend(keyword.params, oldSize, oldSize + sizeof(KvfParam))) {
+    ++keyword.capacity;
+    return;
   }
-  auto* param = new (&keyword.params[keyword.count++]) KvfParam;
-  param->type = type;
-  return *param;
+  // Texts may lie behind: doubling keeps a long list of them linear.
+  keyword.capacity = std::max(2 * keyword.capacity, std::uint32_t{1});
+  auto* moved = static_cast<KvfParam*>(arena.Allocate(keyword.capacity * sizeof(KvfParam), alignof(KvfParam)));
+  std::uninitialized_copy_n(keyword.params, keyword.count, moved);
+  keyword.params = moved;
 }
 
 void KvfFile::SetText(KvfParam& param, std::string_view value) {

@@ -166,7 +166,12 @@ struct KvfFile {
   KvfSection& Cursor() { return open.empty() ? top : *open.back(); }
   KvfSection* AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName);
   KvfNode* AddKeyword(KvfSection& parent, std::string_view writtenName);
-  KvfParam& AddParam(KvfNode& keyword, KvfType type);
+  KvfParam& AddParam(KvfNode& keyword, KvfType type) {
+    if (keyword.count == keyword.capacity) MakeRoomForParam(keyword);
+    auto* param = new (&keyword.params[keyword.count++]) KvfParam;
+    param->type = type;
+    return *param;
+  }
   void SetText(KvfParam& param, std::string_view value);
   /// Appends copies of all children of `from` to `to`.
   void CopyChildren(const KvfSection& from, KvfSection& to);
@@ -209,6 +214,7 @@ inline const KvfSection* AsSection(const KvfNode* node) {
 
 /// Something in a file that nothing asked for.
 struct KvfUnread {
+  void MakeRoomForParam(KvfNode& keyword);
   enum class Kind { Target, Section, Keyword, Parameter, Comment };
   Kind kind;
   int line;
