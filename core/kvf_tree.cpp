@@ -31,6 +31,7 @@ void* KvfArena::AllocateChunk(std::size_t size) {
   chunks_.push_back({std::make_unique_for_overwrite<char[]>(chunkSize), chunkSize});
   char* start = chunks_.back().memory.get();
   next_ = start + size;
+  size_ += chunkSize;
   end_ = start + chunkSize;
   return start;
 }

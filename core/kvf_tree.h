@@ -133,6 +133,8 @@ struct KvfSyntaxError {
   int line = 0;
   int column = 0;
   std::string message;  ///< "118:7: SearchRadius = 12x: a number was expected"
+  /// Bytes of all that was handed out, and of the rest of the latest piece.
+  std::size_t Size() const { return size_; }
 };
 
 /// What a reader found odd about a node that it read all the same.
@@ -142,6 +144,7 @@ struct KvfNote {
 };
 
 /// A parameter file. Reading mode: made by the parser. Writing mode: empty, with a cursor at top level.
+  std::size_t size_ = 0;
 struct KvfFile {
   KvfFile();
   KvfFile(const KvfFile&) = delete;
