@@ -17,46 +17,39 @@
 #include <algorithm>
 #include <array>
 #include <charconv>
+#include <cmath>
 #include <cstring>
 #include <limits>
+#include <type_traits>
+#include <utility>
 
 #include <fmt/format.h>
 
+#include "core/kvf_chars.h"
 #include "platform/text.h"
 
 namespace tervane {
 
 namespace {
 
-enum CharClass : std::uint8_t {
-  kNameStart = 1,
-  kNameRest = 2,
-  kDigit = 4,
-  kPlain = 8,      // stands for itself inside a string
-  kComment = 16,   // may stand in a comment, and needs no look at UTF-8
-  kDelimiter = 32  // ends a number or a word
-};
-
-constexpr std::array<std::uint8_t, 256> MakeClasses() {
-  std::array<std::uint8_t, 256> classes{};
-  for (int c = 0; c < 256; ++c) {
-    const bool letter = (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z') || c == '_';
-    const bool digit = c >= '0' && c <= '9';
-    std::uint8_t set = 0;
-    if (letter) set |= kNameStart;
-    if (letter || digit || c == '.' || c == '%' || c == '-') set |= kNameRest;
-    if (digit) set |= kDigit;
-    if (c >= 0x20 && c < 0x7F && c != '"' && c != '\\') set |= kPlain;
-    if ((c >= 0x20 && c < 0x7F) || c == '\t') set |= kComment;
-    if (c == ' ' || c == '\t' || c == '\r' || c == '\n' || c == ',' || c == '#' || c == '\0') set |= kDelimiter;
-    classes[static_cast<std::size_t>(c)] = set;
-  }
-  return classes;
+/// The value mantissa * 10^exponent where one rounding gives it, so that it is the same as of a careful conversion: the
+/// mantissa and the power of ten are both numbers of that type. False for the rare others.
+template <class Real>
+bool RealOf(std::uint64_t mantissa, int exponent, bool negative, Real& value) {
+  constexpr int largestExponent = std::is_same_v<Real, float> ? 10 : 22;
+  static constexpr auto powers = [] {
+    std::array<Real, largestExponent + 1> powersOfTen{1};
+    for (std::size_t i = 1; i < powersOfTen.size(); ++i) powersOfTen[i] = powersOfTen[i - 1] * 10;
+    return powersOfTen;
+  }();
+  if (mantissa > std::uint64_t{1} << std::numeric_limits<Real>::digits) return false;
+  if (exponent < -largestExponent || exponent > largestExponent) return false;
+  const Real whole = static_cast<Real>(mantissa);
+  value = exponent < 0 ? whole / powers[static_cast<std::size_t>(-exponent)]
+                       : whole * powers[static_cast<std::size_t>(exponent)];
+  if (negative) value = -value;
+  return true;
 }
-
-constexpr std::array<std::uint8_t, 256> kClasses = MakeClasses();
-
-bool Is(char c, CharClass charClass) { return (kClasses[static_cast<unsigned char>(c)] & charClass) != 0; }
 
 /// Bytes of a line as they can be shown in a message: one line, no control characters, whole UTF-8 characters.
 std::string Shown(std::string_view bytes) {
@@ -148,12 +141,21 @@ class Parser {
     while (*at_ == ' ' || *at_ == '\t') ++at_;
   }
 
+  /// The blanks in front of a line, eight in one step where there are so many.
+  void SkipIndentation() {
+    constexpr std::uint64_t eightBlanks = 0x2020'2020'2020'2020;
+    for (std::uint64_t eight; end_ - at_ >= std::ptrdiff_t{sizeof eight}; at_ += sizeof eight) {
+      std::memcpy(&eight, at_, sizeof eight);
+      if (eight != eightBlanks) break;
+    }
+    SkipBlanks();
+  }
+
   /// Blanks, line ends and comments.
   bool SkipSpace() {
     for (;;) {
+      SkipIndentation();
       switch (*at_) {
-        case ' ':
-        case '\t':
         case '\n':
           ++at_;
           break;
@@ -318,11 +320,11 @@ class Parser {
   bool ParseValues(KvfNode& keyword) {
     SkipBlanks();
     if (*at_ == '\n' || *at_ == '\r' || *at_ == '#' || at_ == end_) return EndLine();
+    // Nearly all keywords have one value: its place is right behind its keyword.
+    keyword.params = file_.arena.New<KvfParam>();
+    keyword.capacity = 1;
     for (;;) {
-      // The first value's place is taken with the keyword's own; a text in between may go to the arena too.
-      KvfParam value;
-      if (!ParseValue(value)) return false;
-      file_.AddParam(keyword, value.type) = value;
+      if (!ParseValue(file_.AddParam(keyword, KvfType::Int))) return false;
       SkipBlanks();
       if (*at_ != ',') break;
       ++at_;
@@ -406,57 +408,65 @@ class Parser {
     return true;
   }
 
+  /// Steps over digits and appends them to `mantissa`, which holds up to 19; gives their number.
+  std::ptrdiff_t ScanDigits(std::uint64_t& mantissa) {
+    const char* at = at_;
+    for (; Is(*at, kDigit); ++at) mantissa = mantissa * 10 + static_cast<std::uint64_t>(*at - '0');
+    return at - std::exchange(at_, at);
+  }
+
   bool ParseNumber(KvfParam& value) {
     const char* number = at_;
     const bool negative = *at_ == '-';
     if (negative) ++at_;
-    const char* digits = at_;
-    std::uint64_t whole = 0;
-    while (Is(*at_, kDigit)) whole = whole * 10 + static_cast<std::uint64_t>(*at_++ - '0');
-    const std::ptrdiff_t digitCount = at_ - digits;
+    std::uint64_t mantissa = 0;
+    std::ptrdiff_t digitCount = ScanDigits(mantissa);
     if (digitCount > 0 && Is(*at_, kDelimiter)) {
       const std::uint64_t most = negative ? 0x8000'0000u : 0x7FFF'FFFFu;
       // 19 digits cannot have overflowed the 64 bits.
-      if (digitCount > 19 || whole > most)
+      if (digitCount > 19 || mantissa > most)
         return Fail(number, "a whole number from -2147483648 to 2147483647 was expected");
       value.type = KvfType::Int;
-      value.asInt =
-          static_cast<std::int32_t>(negative ? -static_cast<std::int64_t>(whole) : static_cast<std::int64_t>(whole));
+      const auto whole = static_cast<std::int64_t>(mantissa);
+      value.asInt = static_cast<std::int32_t>(negative ? -whole : whole);
       return true;
     }
     if (negative && (*at_ == 'i' || *at_ == 'n')) {
       if (ParseNotFinite(ScanWord(), -1, value) && Is(*at_, kDelimiter)) return true;
       return Fail(number, "a number was expected");
     }
-    bool hasDigits = digitCount > 0;
+    std::ptrdiff_t fractionCount = 0;
     if (*at_ == '.') {
-      const char* fraction = ++at_;
-      while (Is(*at_, kDigit)) ++at_;
-      hasDigits = hasDigits || at_ != fraction;
+      ++at_;
+      fractionCount = ScanDigits(mantissa);
+      digitCount += fractionCount;
     }
-    if (!hasDigits) return FailNoValue(number);
+    if (digitCount == 0) return FailNoValue(number);
+    bool isKnown = digitCount <= 19;  // more may not have fitted
+    int exponent = 0;
     if (*at_ == 'e' || *at_ == 'E') {
       ++at_;
+      const bool isSmall = *at_ == '-';
       if (*at_ == '+' || *at_ == '-') ++at_;
-      const char* exponent = at_;
-      while (Is(*at_, kDigit)) ++at_;
-      if (at_ == exponent) return Fail(number, "a number was expected: its exponent is missing");
+      std::uint64_t size = 0;
+      const std::ptrdiff_t exponentCount = ScanDigits(size);
+      if (exponentCount == 0) return Fail(number, "a number was expected: its exponent is missing");
+      isKnown = isKnown && exponentCount <= 4;
+      if (isKnown) exponent = isSmall ? -static_cast<int>(size) : static_cast<int>(size);
     }
     const char* numberEnd = at_;
     const bool isFloat = *at_ == 'f';
     if (isFloat) ++at_;
     if (!Is(*at_, kDelimiter)) return Fail(number, "a number was expected");
-    std::from_chars_result result{};
-    if (isFloat) {
-      value.type = KvfType::Float;
-      result = std::from_chars(number, numberEnd, value.asFloat);
-    } else {
-      value.type = KvfType::Double;
-      result = std::from_chars(number, numberEnd, value.asDouble);
-    }
-    if (result.ec == std::errc::result_out_of_range)
-      return Fail(number, fmt::format("a number that fits a {} was expected", isFloat ? "float" : "double"));
-    return result.ptr == numberEnd || Fail(number, "a number was expected");
+    value.type = isFloat ? KvfType::Float : KvfType::Double;
+    const auto take = [&](auto& real) {
+      if (isKnown && RealOf(mantissa, exponent - static_cast<int>(fractionCount), negative, real)) return true;
+      const std::from_chars_result result = std::from_chars(number, numberEnd, real);
+      if (result.ec == std::errc::result_out_of_range)
+        return Fail(number, fmt::format("a number that fits a {} was expected", isFloat ? "float" : "double"));
+      return result.ptr == numberEnd || Fail(number, "a number was expected");
+    };
+    return isFloat ? take(value.asFloat) : take(value.asDouble);
   }
 
   bool FailNoValue(const char* place) {

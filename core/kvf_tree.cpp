@@ -3,8 +3,10 @@
 #include "core/kvf_tree.h"
 
 #include <algorithm>
+#include <bit>
 #include <cstring>
 #include <functional>
+#include <unordered_map>
 
 #include <fmt/format.h>
 
@@ -29,6 +31,7 @@ void* KvfArena::AllocateChunk(std::size_t size) {
   const std::size_t usual = chunks_.empty() ? kFirstChunk : std::min(chunks_.back().size * 2, kLargestChunk);
   const std::size_t chunkSize = std::max(size, usual);
   chunks_.push_back({std::make_unique_for_overwrite<char[]>(chunkSize), chunkSize});
+  size_ += chunkSize;
   char* start = chunks_.back().memory.get();
   next_ = start + size;
   end_ = start + chunkSize;
@@ -60,35 +63,74 @@ bool KvfArena::Owns(const void* address) const {
 // ---- Index
 
 KvfIndex::KvfIndex(const KvfSection& section) {
+  std::vector<KvfNode*> sections;
   nodes_.reserve(section.count);
   for (KvfNode* node = section.firstChild; node; node = node->next) {
     nodes_.push_back(node);
-    (node->IsKeyword() ? keywords_ : sections_).push_back(node);
+    (node->IsKeyword() ? keywords_ : sections).push_back(node);
   }
-  Group(keywords_, keywordGroups_, groupedKeywords_);
-  Group(sections_, sectionGroups_, groupedSections_);
+  keywordNames_.Add(keywords_);
+  sectionNames_.Add(sections);
 }
 
-void KvfIndex::Group(const std::vector<KvfNode*>& nodes, Groups& groups, std::vector<KvfNode*>& grouped) {
-  groups.reserve(nodes.size());
-  for (const KvfNode* node : nodes) ++groups[node->Name()].second;
+std::uint32_t KvfIndex::Names::HashOf(std::string_view name) {
+  return static_cast<std::uint32_t>(std::hash<std::string_view>()(name));
+}
+
+void KvfIndex::Names::Add(const std::vector<KvfNode*>& nodes) {
+  if (nodes.empty()) return;
+  slots_.resize(std::bit_ceil(2 * nodes.size()));
+  std::vector<const KvfNode*> firstNodes;  // of the groups
+  std::vector<std::uint32_t> groupOf;      // of the nodes
+  groupOf.reserve(nodes.size());
+  for (const KvfNode* node : nodes) {
+    const std::uint32_t hash = HashOf(node->Name());
+    std::size_t slot = hash & (slots_.size() - 1);
+    const auto isOther = [&](std::uint32_t number) {
+      return number != 0 && (groups_[number - 1].hash != hash || firstNodes[number - 1]->Name() != node->Name());
+    };
+    while (isOther(slots_[slot])) slot = (slot + 1) & (slots_.size() - 1);
+    if (slots_[slot] == 0) {
+      groups_.push_back({hash, 0, 0});
+      firstNodes.push_back(node);
+      slots_[slot] = static_cast<std::uint32_t>(groups_.size());
+    }
+    groupOf.push_back(slots_[slot] - 1);
+    ++groups_[groupOf.back()].count;
+  }
   std::uint32_t first = 0;
-  for (auto& [name, group] : groups) {
+  for (Group& group : groups_) {
     group.first = first;
-    first += std::exchange(group.second, 0);
+    first += std::exchange(group.count, 0);
   }
-  grouped.resize(nodes.size());
-  for (KvfNode* node : nodes) {
-    auto& group = groups.find(node->Name())->second;
-    grouped[group.first + group.second++] = node;
+  grouped_.resize(nodes.size());
+  for (std::size_t i = 0; i < nodes.size(); ++i) {
+    Group& group = groups_[groupOf[i]];
+    grouped_[group.first + group.count++] = nodes[i];
   }
 }
 
-KvfNode* KvfIndex::Find(bool keyword, std::string_view name, std::size_t instance) const {
-  const Groups& groups = keyword ? keywordGroups_ : sectionGroups_;
-  const auto found = groups.find(name);
-  if (found == groups.end() || instance < 1 || instance > found->second.second) return nullptr;
-  return (keyword ? groupedKeywords_ : groupedSections_)[found->second.first + instance - 1];
+const KvfIndex::Names::Group* KvfIndex::Names::FindGroup(std::string_view name) {
+  // Most ask in the order of the file, so the same name or the next one is meant: a list of many items is then read
+  // without leaps through memory.
+  for (std::size_t number = latest_; number < std::min(latest_ + 2, groups_.size()); ++number)
+    if (NameOf(groups_[number]) == name) return &groups_[latest_ = number];
+  const std::uint32_t hash = HashOf(name);
+  for (std::size_t slot = hash & (slots_.size() - 1); slots_[slot] != 0; slot = (slot + 1) & (slots_.size() - 1)) {
+    const std::size_t number = slots_[slot] - 1;
+    if (groups_[number].hash == hash && NameOf(groups_[number]) == name) return &groups_[latest_ = number];
+  }
+  return nullptr;
+}
+
+KvfNode* KvfIndex::Names::Find(std::string_view name, std::size_t instance) {
+  if (groups_.empty()) return nullptr;
+  const Group* group = FindGroup(name);
+  return group && instance >= 1 && instance <= group->count ? grouped_[group->first + instance - 1] : nullptr;
+}
+
+KvfNode* KvfIndex::Find(bool keyword, std::string_view name, std::size_t instance) {
+  return (keyword ? keywordNames_ : sectionNames_).Find(name, instance);
 }
 
 KvfNode* FindKvfNode(KvfSection& section, bool keyword, std::string_view name, std::size_t instance) {
@@ -162,23 +204,17 @@ KvfNode* KvfFile::AddKeyword(KvfSection& parent, std::string_view writtenName) {
   return keyword;
 }
 
-KvfParam& KvfFile::AddParam(KvfNode& keyword, KvfType type) {
-  if (keyword.count == keyword.capacity) {
-    const std::size_t oldSize = keyword.capacity * sizeof(KvfParam);
-    if (keyword.capacity > 0 && arena.Extend(keyword.params, oldSize, oldSize + sizeof(KvfParam))) {
-      ++keyword.capacity;
-    } else {
-      // Texts may lie behind: doubling keeps a long list of them linear.
-      keyword.capacity = std::max(2 * keyword.capacity, std::uint32_t{1});
-      void* memory = arena.Allocate(keyword.capacity * sizeof(KvfParam), alignof(KvfParam));
-      auto* moved = static_cast<KvfParam*>(memory);
-      std::uninitialized_copy_n(keyword.params, keyword.count, moved);
-      keyword.params = moved;
-    }
+void KvfFile::MakeRoomForParam(KvfNode& keyword) {
+  const std::size_t oldSize = keyword.capacity * sizeof(KvfParam);
+  if (keyword.capacity > 0 && arena.Extend(keyword.params, oldSize, oldSize + sizeof(KvfParam))) {
+    ++keyword.capacity;
+    return;
   }
-  auto* param = new (&keyword.params[keyword.count++]) KvfParam;
-  param->type = type;
-  return *param;
+  // Texts may lie behind: doubling keeps a long list of them linear.
+  keyword.capacity = std::max(2 * keyword.capacity, std::uint32_t{1});
+  auto* moved = static_cast<KvfParam*>(arena.Allocate(keyword.capacity * sizeof(KvfParam), alignof(KvfParam)));
+  std::uninitialized_copy_n(keyword.params, keyword.count, moved);
+  keyword.params = moved;
 }
 
 void KvfFile::SetText(KvfParam& param, std::string_view value) {

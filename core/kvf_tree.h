@@ -10,7 +10,6 @@
 #include <memory>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <utility>
 #include <vector>
 
@@ -81,19 +80,38 @@ class KvfIndex {
 
   KvfNode* Node(std::size_t number) const { return At(nodes_, number); }
   KvfNode* Keyword(std::size_t number) const { return At(keywords_, number); }
-  KvfNode* Find(bool keyword, std::string_view name, std::size_t instance) const;
+  KvfNode* Find(bool keyword, std::string_view name, std::size_t instance);
 
  private:
-  using Groups = std::unordered_map<std::string_view, std::pair<std::uint32_t, std::uint32_t>>;
+  /// The nodes of one kind by name.
+  class Names {
+   public:
+    void Add(const std::vector<KvfNode*>& nodes);
+    KvfNode* Find(std::string_view name, std::size_t instance);
+
+   private:
+    struct Group {
+      std::uint32_t hash;
+      std::uint32_t first;  ///< Place of the first node in `grouped_`.
+      std::uint32_t count;
+    };
+
+    static std::uint32_t HashOf(std::string_view name);
+    std::string_view NameOf(const Group& group) const { return grouped_[group.first]->Name(); }
+    const Group* FindGroup(std::string_view name);
+
+    std::vector<std::uint32_t> slots_;  ///< Number of a group from 1, or 0, at its hash or behind.
+    std::vector<Group> groups_;         ///< In the order of their first nodes.
+    std::vector<KvfNode*> grouped_;     ///< Equal names side by side, in the order of the file.
+    std::size_t latest_ = 0;            ///< The group that was found last.
+  };
 
   static KvfNode* At(const std::vector<KvfNode*>& nodes, std::size_t number) {
     return number >= 1 && number <= nodes.size() ? nodes[number - 1] : nullptr;
   }
-  static void Group(const std::vector<KvfNode*>& nodes, Groups& groups, std::vector<KvfNode*>& grouped);
 
-  std::vector<KvfNode*> nodes_, keywords_, sections_;
-  std::vector<KvfNode*> groupedKeywords_, groupedSections_;  ///< Equal names side by side, in the order of the file.
-  Groups keywordGroups_, sectionGroups_;                     ///< Name: first place in the grouped nodes, and count.
+  std::vector<KvfNode*> nodes_, keywords_;
+  Names keywordNames_, sectionNames_;
 };
 
 /// Memory that is handed out in order and freed as a whole.
@@ -115,6 +133,8 @@ class KvfArena {
   /// Lengthens the latest allocation in place; false where that is not possible.
   bool Extend(const void* start, std::size_t oldSize, std::size_t newSize);
   bool Owns(const void* address) const;
+  /// Bytes of all that was handed out, and of the rest of the latest piece.
+  std::size_t Size() const { return size_; }
 
  private:
   void* AllocateChunk(std::size_t size);
@@ -124,6 +144,7 @@ class KvfArena {
     std::size_t size;
   };
   std::vector<Chunk> chunks_;
+  std::size_t size_ = 0;
   char* next_ = nullptr;
   char* end_ = nullptr;
 };
@@ -166,7 +187,12 @@ struct KvfFile {
   KvfSection& Cursor() { return open.empty() ? top : *open.back(); }
   KvfSection* AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName);
   KvfNode* AddKeyword(KvfSection& parent, std::string_view writtenName);
-  KvfParam& AddParam(KvfNode& keyword, KvfType type);
+  KvfParam& AddParam(KvfNode& keyword, KvfType type) {
+    if (keyword.count == keyword.capacity) MakeRoomForParam(keyword);
+    auto* param = new (&keyword.params[keyword.count++]) KvfParam;
+    param->type = type;
+    return *param;
+  }
   void SetText(KvfParam& param, std::string_view value);
   /// Appends copies of all children of `from` to `to`.
   void CopyChildren(const KvfSection& from, KvfSection& to);
@@ -188,6 +214,7 @@ struct KvfFile {
  private:
   KvfSection* NewSection(KvfKind kind, std::string_view writtenName);
   void SetName(KvfNode& node, std::string_view writtenName);
+  void MakeRoomForParam(KvfNode& keyword);
 
   std::deque<KvfIndex> indices_;
   mutable std::vector<std::uint32_t> lineStarts_;  ///< Made when a line is first asked.

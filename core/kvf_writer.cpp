@@ -5,106 +5,191 @@
 #include <algorithm>
 #include <array>
 #include <charconv>
-#include <cmath>
 #include <cstring>
+#include <type_traits>
 
 #include <fmt/format.h>
 
+#include "core/kvf_chars.h"
 #include "platform/text.h"
 
 namespace tervane {
 
 namespace {
 
-bool IsPlain(char c) {
-  const auto byte = static_cast<unsigned char>(c);
-  return byte >= 0x20 && byte != 0x7F && c != '"' && c != '\\';
-}
+/// Composes text in a small buffer that stays in the processor's cache, and appends it to a string piece by piece.
+class TextWriter {
+ public:
+  explicit TextWriter(std::string& text) : text_(text) {}
+  ~TextWriter() { Flush(); }
+  TextWriter(const TextWriter&) = delete;
+  TextWriter& operator=(const TextWriter&) = delete;
 
-bool IsBareName(std::string_view name) {
-  const auto isLetter = [](char c) { return (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z') || c == '_'; };
-  const auto isRest = [&](char c) { return isLetter(c) || (c >= '0' && c <= '9') || c == '.' || c == '%' || c == '-'; };
-  return !name.empty() && isLetter(name[0]) && std::all_of(name.begin() + 1, name.end(), isRest);
-}
+  void Put(char c) {
+    if (out_ == buffer_.data() + buffer_.size()) Flush();
+    *out_++ = c;
+  }
+  void Put(std::string_view piece) {
+    char* place = Room(piece.size());
+    if (!place) {
+      text_ += piece;
+      return;
+    }
+    std::memcpy(place, piece.data(), piece.size());
+    out_ = place + piece.size();
+  }
+  template <std::size_t size>
+  void Put(const char (&literal)[size]) {
+    // The compiler knows the size and calls nobody.
+    std::memcpy(Room(size), literal, size);
+    out_ += size - 1;
+  }
+  void PutBlanks(std::size_t count) {
+    constexpr std::string_view blanks = "                                ";
+    for (; count > blanks.size(); count -= blanks.size()) Put(blanks);
+    std::memcpy(Room(blanks.size()), blanks.data(), blanks.size());
+    out_ += count;
+  }
+  /// A piece of at most `most` bytes, which `write(place)` writes; it gives the end.
+  template <class Write>
+  void PutWith(std::size_t most, const Write& write) {
+    out_ = write(Room(most));
+  }
 
-void AppendQuoted(std::string_view value, std::string& text) {
-  text += '"';
+  void Quoted(std::string_view value);
+  void Name(const KvfNode& node);
+  void Value(const KvfParam& param);
+  void Values(const KvfNode& keyword);
+  void Nodes(const KvfSection& section, std::size_t indent);
+
+ private:
+  /// The place of the next bytes in the buffer, null (and the buffer empty) when they are more than it holds.
+  char* Room(std::size_t size) {
+    if (size > static_cast<std::size_t>(buffer_.data() + buffer_.size() - out_)) Flush();
+    return size <= buffer_.size() ? out_ : nullptr;
+  }
+  void Flush() {
+    text_.append(buffer_.data(), out_);
+    out_ = buffer_.data();
+  }
+
+  std::string& text_;
+  std::array<char, 4096> buffer_;
+  char* out_ = buffer_.data();
+};
+
+void TextWriter::Quoted(std::string_view value) {
+  Put('"');
   while (!value.empty()) {
-    const auto plain = static_cast<std::size_t>(std::find_if_not(value.begin(), value.end(), IsPlain) - value.begin());
-    text += value.substr(0, plain);
+    const auto isUnescaped = [](char c) { return Is(c, kUnescaped); };
+    const auto plain =
+        static_cast<std::size_t>(std::find_if_not(value.begin(), value.end(), isUnescaped) - value.begin());
+    Put(value.substr(0, plain));
     if (plain == value.size()) break;
     switch (const char c = value[plain]) {
       case '"':
-        text += "\\\"";
+        Put("\\\"");
         break;
       case '\\':
-        text += "\\\\";
+        Put("\\\\");
         break;
       case '\n':
-        text += "\\n";
+        Put("\\n");
         break;
       case '\r':
-        text += "\\r";
+        Put("\\r");
         break;
       case '\t':
-        text += "\\t";
+        Put("\\t");
         break;
       default:
-        text += fmt::format("\\u{{{:x}}}", static_cast<unsigned char>(c));
+        Put(fmt::format("\\u{{{:x}}}", static_cast<unsigned char>(c)));
     }
     value.remove_prefix(plain + 1);
   }
-  text += '"';
+  Put('"');
 }
 
-void AppendName(const KvfNode& node, std::string& text) {
+void TextWriter::Name(const KvfNode& node) {
   const std::string_view name = node.WrittenName();
+  // Nearly all names are short and bare: they are copied while they are checked.
+  if (char* place = Room(name.size()); place && !name.empty() && Is(name[0], kNameStart)) {
+    std::size_t size = 0;
+    for (; size < name.size() && Is(name[size], kNameRest); ++size) place[size] = name[size];
+    if (size == name.size()) {
+      out_ += size;
+      return;
+    }
+  }
   if (IsBareName(name))
-    text += name;
+    Put(name);
   else
-    AppendQuoted(name, text);
+    Quoted(name);
 }
 
 /// A float or double in its shortest form; a double that looks like a whole number gets a point.
 template <class Number>
-void AppendReal(Number value, std::string& text) {
-  std::array<char, kNumberBuffer + 2> buffer;
-  char* end = ShortestNumber(value, buffer.data());
+char* WriteReal(Number value, char* place) {
+  char* end = ShortestNumber(value, place);
   if constexpr (std::is_same_v<Number, double>) {
-    const auto isWhole = [](char c) { return (c >= '0' && c <= '9') || c == '-'; };
-    if (std::all_of(buffer.data(), end, isWhole)) {
+    const auto isWhole = [](char c) { return Is(c, kDigit) || c == '-'; };
+    if (std::all_of(place, end, isWhole)) {
       *end++ = '.';
       *end++ = '0';
     }
   } else {
     *end++ = 'f';
   }
-  text.append(buffer.data(), end);
+  return end;
 }
 
-void AppendValue(const KvfParam& param, std::string& text) {
+void TextWriter::Value(const KvfParam& param) {
+  constexpr std::size_t most = kNumberBuffer + 2;
   switch (param.type) {
-    case KvfType::Int: {
-      std::array<char, 12> buffer;
-      const auto result = std::to_chars(buffer.data(), buffer.data() + buffer.size(), param.asInt);
-      text.append(buffer.data(), result.ptr);
+    case KvfType::Int:
+      PutWith(most, [&](char* place) { return std::to_chars(place, place + most, param.asInt).ptr; });
       break;
-    }
     case KvfType::Float:
-      AppendReal(param.asFloat, text);
+      PutWith(most, [&](char* place) { return WriteReal(param.asFloat, place); });
       break;
     case KvfType::Double:
-      AppendReal(param.asDouble, text);
+      PutWith(most, [&](char* place) { return WriteReal(param.asDouble, place); });
       break;
     case KvfType::Bool:
-      text += param.asBool ? "true" : "false";
+      param.asBool ? Put("true") : Put("false");
       break;
     case KvfType::Filename:
-      text += "file ";
+      Put("file ");
       [[fallthrough]];
     case KvfType::String:
-      AppendQuoted(param.Text(), text);
+      Quoted(param.Text());
       break;
+  }
+}
+
+void TextWriter::Values(const KvfNode& keyword) {
+  for (std::uint32_t i = 0; i < keyword.count; ++i) {
+    if (i > 0) Put(", ");
+    Value(keyword.params[i]);
+  }
+}
+
+void TextWriter::Nodes(const KvfSection& section, std::size_t indent) {
+  for (const KvfNode* node = section.firstChild; node; node = node->next) {
+    PutBlanks(indent);
+    if (const KvfSection* child = AsSection(node)) {
+      child->kind == KvfKind::Target ? Put("target ") : Put("section ");
+      Name(*child);
+      Put(" {\n");
+      Nodes(*child, indent + 2);
+      PutBlanks(indent);
+      Put("}\n");
+      continue;
+    }
+    Name(*node);
+    node->count > 0 ? Put(" = ") : Put(" =");
+    Values(*node);
+    Put('\n');
   }
 }
 
@@ -121,15 +206,7 @@ void AppendPlainValue(const KvfParam& param, std::string& text) {
       text += param.Text();
       break;
     default:
-      AppendValue(param, text);
-  }
-}
-
-template <class Append>
-void AppendValues(const KvfNode& keyword, std::string& text, const Append& append) {
-  for (std::uint32_t i = 0; i < keyword.count; ++i) {
-    if (i > 0) text += ", ";
-    append(keyword.params[i], text);
+      text += KvfValueText(param);
   }
 }
 
@@ -151,54 +228,46 @@ std::string FindBadText(const KvfSection& section) {
 }  // namespace
 
 void AppendKvfNodes(const KvfSection& section, int level, std::string& text) {
-  const std::size_t indent = 2 * static_cast<std::size_t>(level);
-  for (const KvfNode* node = section.firstChild; node; node = node->next) {
-    text.append(indent, ' ');
-    if (const KvfSection* child = AsSection(node)) {
-      text += child->kind == KvfKind::Target ? "target " : "section ";
-      AppendName(*child, text);
-      text += " {\n";
-      AppendKvfNodes(*child, level + 1, text);
-      text.append(indent, ' ');
-      text += "}\n";
-      continue;
-    }
-    AppendName(*node, text);
-    text += node->count > 0 ? " = " : " =";
-    AppendValues(*node, text, AppendValue);
-    text += '\n';
-  }
+  TextWriter(text).Nodes(section, 2 * static_cast<std::size_t>(level));
 }
 
 bool WriteKvfText(const KvfFile& file, std::string& text, std::string& error) {
+  text.clear();
   if (!file.unwritable.empty()) {
     error = file.unwritable;
     return false;
   }
-  if (const std::string bad = FindBadText(file.top); !bad.empty()) {
-    error = fmt::format("{} is no UTF-8 text", bad);
-    return false;
-  }
+  // A node with its name and value takes about twice the memory of its line.
+  text.reserve(file.header.size() + file.arena.Size() / 2);
   text = file.header;
   AppendKvfNodes(file.top, 0, text);
+  // Texts stand between ASCII, so the whole is UTF-8 when each is; only the unlucky case looks for the one that is not.
+  if (FirstInvalidUtf8(std::string_view(text).substr(file.header.size()))) {
+    text.clear();
+    error = fmt::format("{} is no UTF-8 text", FindBadText(file.top));
+    return false;
+  }
   return true;
 }
 
 std::string KvfValueText(const KvfParam& param) {
   std::string text;
-  AppendValue(param, text);
+  TextWriter(text).Value(param);
   return text;
 }
 
 std::string KvfValuesText(const KvfNode& keyword) {
   std::string text;
-  AppendValues(keyword, text, AppendValue);
+  TextWriter(text).Values(keyword);
   return text;
 }
 
 std::string PlainValuesText(const KvfNode& keyword) {
   std::string text;
-  AppendValues(keyword, text, AppendPlainValue);
+  for (std::uint32_t i = 0; i < keyword.count; ++i) {
+    if (i > 0) text += ", ";
+    AppendPlainValue(keyword.params[i], text);
+  }
   return text;
 }
 

@@ -15,8 +15,8 @@ namespace tervane {
 CYbSEKvfBase::CYbSEKvfBase(std::string title, std::string sectionName, CYbSEKvfBase* parent)
     : parent_(parent),
       root_(parent ? parent->root_ : nullptr),
-      title_(std::move(title)),
-      sectionName_(std::move(sectionName)) {}
+      sectionName_(std::move(sectionName)),
+      title_(std::move(title)) {}
 
 CYbSEKvfBase::~CYbSEKvfBase() {
   if (isImportant_ && root_ && root_ != this) root_->UnregisterNode(this);

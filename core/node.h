@@ -180,17 +180,18 @@ class CYbSEKvfBase {
 
   CYbSEKvfBase* parent_;
   CYbSEKvfGlobalBase* root_;
-  std::vector<std::unique_ptr<CYbSEKvfBase>> properties_;
-  std::string title_, abbreviatedTitle_, sectionName_, helpFile_, helpPage_;
-  std::vector<Finding> findings_;
+  // What every walk asks stands in front, close together: a walk over many nodes waits for memory more than it works.
   int touched_ = 0;
   int sectionNumber_ = -1;
   int sectionUsed_ = 1;
-  int sectionInstance_ = 1;     ///< Which of several like sections of the parent is this node's.
+  int sectionInstance_ = 1;              ///< Which of several like sections of the parent is this node's.
+  mutable std::uint32_t placeHint_ = 0;  ///< Place among the siblings when last asked; checked before use.
+  int valid_ = 1;
   bool missedSection_ = false;  ///< The latest load looked for the section and did not find it.
   bool isImportant_ = false;    ///< Registered at the root at least once.
-  int valid_ = 1;
-  mutable std::uint32_t placeHint_ = 0;  ///< Place among the siblings when last asked; checked before use.
+  std::vector<Finding> findings_;
+  std::vector<std::unique_ptr<CYbSEKvfBase>> properties_;
+  std::string sectionName_, title_, abbreviatedTitle_, helpFile_, helpPage_;
 };
 
 /// A node that is meant to hold further nodes.
