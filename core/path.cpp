@@ -67,7 +67,9 @@ SetupPath ParseSetupPath(std::string_view text) {
     if (!path.error.empty() || at == text.size()) break;
     const char separator = text[at++];
     if (inKey || (separator != '/' && separator != ':')) {
-      path.error = fmt::format("{} was not expected at place {}", text.substr(at - 1), at);
+      std::size_t end = at;
+      while (end < text.size() && (static_cast<unsigned char>(text[end]) & 0xC0) == 0x80) ++end;
+      path.error = fmt::format("'{}' was not expected at place {}", text.substr(at - 1, end - at + 1), at);
     } else if (separator == ':') {
       inKey = true;
     } else if (at == text.size()) {
