@@ -35,6 +35,14 @@ TEST(ViewSettings, AnAreaIsReadOnlyWhenItsFlagSaysThatItIsDefined) {
   }
 }
 
+TEST(ViewSettings, AnUndefinedAreaIsWrittenWithoutTheSignsOfItsZeros) {
+  CFlowModelDoc document;
+  document.Global().SetDefaultDataArea({0, -0.0, 0, -0.0});
+  EXPECT_EQ(ValueOf(document, "ViewSettings:DefaultZoomDataAreaUndefined"), "1");
+  EXPECT_EQ(ValueOf(document, "ViewSettings:DefaultZoomDataArea_Y0"), "0");
+  EXPECT_EQ(ValueOf(document, "ViewSettings:DefaultZoomDataArea_Y1"), "0");
+}
+
 TEST(ViewSettings, WritesTheAreasOfTheRoot) {
   CFlowModelDoc document;
   EXPECT_EQ(document.Global().SetMaxDataArea({0, 0, 100, 50}), 1);
