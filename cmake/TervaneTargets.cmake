@@ -7,7 +7,8 @@ add_library(tervane_warnings INTERFACE)
 target_compile_options(tervane_warnings INTERFACE
   $<$<CXX_COMPILER_ID:MSVC>:/W4 /WX /utf-8>
   $<$<NOT:$<CXX_COMPILER_ID:MSVC>>:-Wall -Wextra -Wpedantic -Wconversion -Wshadow -Wnon-virtual-dtor
-    -Woverloaded-virtual -Wcast-align -Wno-restrict -Werror>)
+    -Woverloaded-virtual -Wcast-align -Werror>
+  $<$<CXX_COMPILER_ID:GNU>:-Wno-restrict>)
 
 # tervane_library(NAME [SOURCES ...] [LINKS ...]): one folder, one library `tervane_NAME`; without sources it has headers
 # alone. LINKS are public: who links a floor sees the floors below it.

@@ -1,0 +1,79 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Any bytes as a setup. What opens must be written as a text that opens again, of which nothing stays unread, and that
+// is written again byte for byte.
+#include <cstdint>
+#include <string>
+
+#include "core/kvf.h"
+#include "core/kvf_parser.h"
+#include "document/flow_model_document.h"
+#include "fuzz/require.h"
+
+namespace tervane {
+namespace {
+
+using fuzz::Require;
+
+constexpr const char* kPath = "/setups/fuzzed.tvd";
+constexpr const char* kFolder = "/setups";
+
+bool IsCountKey(std::string_view name) {
+  return name.find("Count") != std::string_view::npos || name.starts_with("No") || name.starts_with("Num");
+}
+
+/// Sum of the item counts that a file asks for.
+double AskedItems(const KvfSection& section) {
+  double sum = 0;
+  for (const KvfNode* node = section.firstChild; node; node = node->next) {
+    if (const KvfSection* child = AsSection(node)) {
+      sum += AskedItems(*child);
+    } else if (IsCountKey(node->Name()) && node->count > 0) {
+      const KvfParam& count = node->params[0];
+      const double number = count.type == KvfType::Int     ? count.asInt
+                            : count.type == KvfType::Float ? static_cast<double>(count.asFloat)
+                                                           : kvfGetDouble(&count);
+      if (number > 0) sum += number;
+    }
+  }
+  return sum;
+}
+
+/// A count of up to a million items is legal in a file of a few bytes, and costs a second and hundreds of megabytes:
+/// the fuzzer would find nothing but these. Above this number it learns nothing new.
+constexpr double kMostItems = 2000;
+
+bool AsksForTooMuch(std::string_view input) {
+  KvfFile file;
+  file.text = FileContent::Of(input);
+  return ParseKvf(file) && AskedItems(file.top) > kMostItems;
+}
+
+void Check(std::string_view input) {
+  if (AsksForTooMuch(input)) return;
+  CFlowModelDoc first;
+  if (!first.OpenText(input, kPath)) return Require(!first.Error().empty(), "a refused setup has a reason");
+  const int valid = first.Root().Validate();
+  std::vector<OverviewLine> overview;
+  GenerateOverview(first.Root(), overview);
+  std::string text, error;
+  Require(first.BuildText(kFolder, text, error), "what was opened can be written", error);
+
+  CFlowModelDoc second;
+  Require(second.OpenText(text, kPath), "what was written opens", second.Error());
+  for (const KvfUnread& unread : second.Report().unread)
+    Require(false, "what was written is read", unread.path + ": " + unread.text);
+  Require(second.Root().Validate() == valid, "a written setup is as valid as it was", text);
+  std::string again;
+  Require(second.BuildText(kFolder, again, error), "what was opened can be written", error);
+  Require(text == again, "the text is the same the second time", text + "\n---- and then:\n" + again);
+}
+
+}  // namespace
+}  // namespace tervane
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  tervane::Check({reinterpret_cast<const char*>(data), size});
+  return 0;
+}
