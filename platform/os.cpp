@@ -8,6 +8,7 @@
 #define NOMINMAX
 #define WIN32_LEAN_AND_MEAN
 #include <algorithm>
+#include <clocale>
 
 #include <windows.h>
 // Behind windows.h, on which it depends.
@@ -27,6 +28,7 @@
 
 #include <cxxabi.h>
 #include <fcntl.h>
+#include <locale.h>
 #include <signal.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -150,6 +152,16 @@ void RenameToNew(const std::string& from, const std::string& to, std::error_code
 void FlushFolder(const std::string&, std::error_code& error) {
   // MOVEFILE_WRITE_THROUGH has done it.
   error.clear();
+}
+
+CLocaleScope::CLocaleScope() : perThread_(_configthreadlocale(_ENABLE_PER_THREAD_LOCALE)) {
+  if (const char* locale = std::setlocale(LC_ALL, nullptr)) before_ = locale;
+  std::setlocale(LC_ALL, "C");
+}
+
+CLocaleScope::~CLocaleScope() {
+  std::setlocale(LC_ALL, before_.c_str());
+  _configthreadlocale(perThread_);
 }
 
 std::string DemangledName(const std::type_info& type) {
@@ -395,6 +407,16 @@ void FlushFolder(const std::string& folder, std::error_code& error) {
       error == std::errc::permission_denied) {
     error.clear();
   }
+}
+
+CLocaleScope::CLocaleScope() {
+  // The "C" locale as a whole is an object that the C library holds; one with its numbers alone would be made anew.
+  static const locale_t cLocale = newlocale(LC_ALL_MASK, "C", locale_t{});
+  if (cLocale != locale_t{}) before_ = uselocale(cLocale);
+}
+
+CLocaleScope::~CLocaleScope() {
+  if (before_ != nullptr) uselocale(static_cast<locale_t>(before_));
 }
 
 std::string DemangledName(const std::type_info& type) {

@@ -71,6 +71,24 @@ void RenameToNew(const std::string& from, const std::string& to, std::error_code
 /// Flushes a folder, so that a rename in it outlives a power cut. File systems that cannot do so are left alone.
 void FlushFolder(const std::string& folder, std::error_code& error);
 
+/// While it lives, this thread works in the "C" locale, for libraries that read numbers by the process's locale and so
+/// fail where a comma stands for the point. To be destroyed by the thread that made it.
+class CLocaleScope {
+ public:
+  CLocaleScope();
+  ~CLocaleScope();
+  CLocaleScope(const CLocaleScope&) = delete;
+  CLocaleScope& operator=(const CLocaleScope&) = delete;
+
+ private:
+#ifdef _WIN32
+  int perThread_ = 0;
+  std::string before_;
+#else
+  void* before_ = nullptr;
+#endif
+};
+
 /// Name of a type as it stands in the source, with its namespaces.
 std::string DemangledName(const std::type_info& type);
 
