@@ -161,7 +161,7 @@ TEST(CommandLine, APlaceThatIsNotThereIsToldWithWhatComesNear) {
       {"SimSpec/ModelCmp:ET", "did you mean ModelComp?"},    {"simspec:ModelType", "did you mean SimSpec?"},
       {"SimSpec:ModelTyp", "did you mean ModelType?"},       {"SimSpec", "a key was expected"},
       {"SimSpec#2:ModelType", "there is no SimSpec#2 here"}, {"SimSpec/", "a name was expected"},
-      {"SimSpec:A:B", ":B was not expected at place 10"},    {"\"SimSpec", "the closing \" of a name is missing"}};
+      {"SimSpec:A:B", "':' was not expected at place 10"},   {"\"SimSpec", "the closing \" of a name is missing"}};
   for (const auto& c : cases) {
     const Outcome outcome = Tervane({"get", file, c.path});
     EXPECT_EQ(outcome.status, kCouldNot);
