@@ -65,6 +65,11 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
                             [&] { return ShowCommand(typed.file, typed.path, streams); })),
            "The node; without it the whole setup");
 
+  withPath(withFile(command("page", "Show the page of a node as text, control by control",
+                            [&] { return PageCommand(typed.file, typed.path, streams); })),
+           "The node")
+      ->required();
+
   withPath(withFile(command("get", "Print the value of a key, as it would be saved",
                             [&] { return GetCommand(typed.file, typed.path, streams); })),
            "The key, as SECTION/SECTION:KEY")

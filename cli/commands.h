@@ -24,6 +24,9 @@ enum class TreeForm { Text, Paths, Json };
 int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams);
 int ShowCommand(const std::string& file, const std::string& path, Streams streams);
 
+/// The page of a node as text.
+int PageCommand(const std::string& file, const std::string& path, Streams streams);
+
 int GetCommand(const std::string& file, const std::string& path, Streams streams);
 int SetCommand(const std::string& file, const std::string& path, const std::string& value, Streams streams);
 

@@ -36,7 +36,7 @@ _tervane() {{
 {}  esac
   if [[ "$current" == -* ]]; then
     mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
-  elif ((COMP_CWORD == 3)) && [[ "$command" =~ ^(show|get|set)$ ]]; then
+  elif ((COMP_CWORD == 3)) && [[ "$command" =~ ^(show|page|get|set)$ ]]; then
     local IFS=$'\n'
     mapfile -t COMPREPLY < <(compgen -W "$(tervane tree "${{COMP_WORDS[2]}}" --all --paths 2>/dev/null)" -- "$current")
   else

@@ -209,11 +209,11 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
     return item;
   }
 
-  Item* AddItem() override {
-    Item* item = Nodes::AddItem();
+  void AddItemNode() override {
+    Nodes::AddItemNode();
+    Item* item = this->GetItem(this->GetItemCount());
     item->SetName(NewName(*item));
     LinkNewItem(item);
-    return item;
   }
 
   void InsertItem(int number, int level) override {

@@ -25,6 +25,7 @@ struct OpenFile {
 CYbSEDocument::CYbSEDocument(std::unique_ptr<CYbSEKvfGlobalBase> root) : root_(std::move(root)) {}
 
 bool CYbSEDocument::OnOpenDocument(const std::string& path) {
+  kvfGetErrorGlb();  // what an earlier reader left
   KvfFile* file = kvfLoadFile(path, 0);
   if (kvfGetErrorGlb() != kKvfNoError) {
     error_ = kvfErrorText();
@@ -57,6 +58,7 @@ bool CYbSEDocument::LoadTree(KvfFile* file, const std::string& path) {
   }
   path_ = path;
   header_ = file->header;
+  root_->SetSetupFolder(file->folder);
   root_->Load(&file->top);
 
   int useCustom = 0;
@@ -124,6 +126,7 @@ bool CYbSEDocument::OnSaveDocument(const std::string& path) {
   if (!result.note.empty()) saveNotes_.push_back(result.note);
   if (overwritesOriginal) original_.mustBeKept = false;
   path_ = path;
+  root_->SetSetupFolder(std::string(FolderOf(AbsoluteFromHere(path))));
   modified_ = false;
   return true;
 }

@@ -31,6 +31,8 @@ class CYbSEKvfListBaseInterface : public CYbSEKvfBase {
 
   int GetItemCount() const { return static_cast<int>(children_.size() - plainChildren_); }
   CYbSEKvfBase* GetItemNode(int number) const;
+  /// Appends an item.
+  virtual void AddItemNode() { SetItemCount(GetItemCount() + 1, 1); }
   /// Makes an item with this list as its parent; not added to the list.
   virtual std::unique_ptr<CYbSEKvfBase> NewItemNode() = 0;
 
@@ -78,8 +80,8 @@ class CYbSEKvfAbstractListBase : public CYbSEKvfListBaseInterface {
   virtual std::unique_ptr<Item> NewItem() = 0;
   Item* GetItem(int number) const { return static_cast<Item*>(GetItemNode(number)); }
   /// Appends an item.
-  virtual Item* AddItem() {
-    SetItemCount(GetItemCount() + 1, 1);
+  Item* AddItem() {
+    this->AddItemNode();
     return GetItem(GetItemCount());
   }
 

@@ -14,6 +14,7 @@
 
 #include "core/key_exchange.h"
 #include "core/kvf.h"
+#include "core/page_class.h"
 #include "core/path.h"
 
 namespace tervane {
@@ -63,6 +64,14 @@ class CYbSEKvfBase {
   std::unique_ptr<CYbSEKvfBase> RemoveChild(CYbSEKvfBase* child);
   void SwapChilds(CYbSEKvfBase* a, CYbSEKvfBase* b);
 
+  /// The first child of that class, or null.
+  template <class Node>
+  Node* Child() const {
+    for (const auto& child : children_)
+      if (auto* node = dynamic_cast<Node*>(child.get())) return node;
+    return nullptr;
+  }
+
   /// The walk over all children, in a list the plain children first and then the items. The node whose follower has
   /// been fetched may be removed.
   CYbSEKvfBase* GetFirstChild() const { return children_.empty() ? nullptr : children_.front().get(); }
@@ -109,6 +118,11 @@ class CYbSEKvfBase {
   /// The page name given to `SetHelp`.
   const std::string& GetHtml() const { return helpPage_; }
   const std::string& GetHelpFile() const { return helpFile_; }
+
+  /// The class of the node's page in that tree, or null when the tree does not show the node.
+  virtual const PageClass* GetDlgRuntimeClass(int treeId) const {
+    return treeId == kSetupDataTree ? setupPage_ : nullptr;
+  }
 
   // ---- File
 
@@ -161,6 +175,8 @@ class CYbSEKvfBase {
   void AddError(std::string text, std::string key = {}, std::string detail = {});
   void AddWarning(std::string text, std::string key = {}, std::string detail = {});
 
+  /// The page that the tree of the setup data shows.
+  void SetPage(const PageClass& page) { setupPage_ = &page; }
   void SectionName(std::string name) { sectionName_ = std::move(name); }
   /// The node's section in the parent's section, marked as looked up; null when there is none.
   KvfNode* FindSection(KvfNode* parentSection) const;
@@ -192,6 +208,7 @@ class CYbSEKvfBase {
   std::vector<Finding> findings_;
   std::vector<std::unique_ptr<CYbSEKvfBase>> properties_;
   std::string sectionName_, title_, abbreviatedTitle_, helpFile_, helpPage_;
+  const PageClass* setupPage_ = nullptr;
 };
 
 /// A node that is meant to hold further nodes.
@@ -237,6 +254,10 @@ class CYbSEKvfGlobalBase : public CYbSEKvfBase {
   void Load(KvfNode* parentSection) override;
   void Save(KvfFile* file) override;
 
+  /// Folder of the setup's file, from which the names of files that the user picks start; empty for a new setup.
+  const std::string& SetupFolder() const { return setupFolder_; }
+  void SetSetupFolder(std::string folder) { setupFolder_ = std::move(folder); }
+
   /// True once after `SetRevalidateAll`.
   bool TakeRevalidateAll() { return std::exchange(revalidateAll_, false); }
 
@@ -245,6 +266,7 @@ class CYbSEKvfGlobalBase : public CYbSEKvfBase {
 
   std::string targetName_;
   std::unordered_map<std::string, CYbSEKvfBase*> importantNodes_;
+  std::string setupFolder_;
   bool revalidateAll_ = false;
 };
 

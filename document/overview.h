@@ -6,13 +6,14 @@
 #include <vector>
 
 #include "core/node.h"
+#include "document/pages.h"
 
 namespace tervane {
 
 /// The overview of the whole setup as text, made when its page is shown.
 class COverviewKvf : public CTvnKvfBase {
  public:
-  explicit COverviewKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Overview", "Overview", parent) {}
+  explicit COverviewKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Overview", "Overview", parent) { SetPage(kOverviewPage); }
 
   std::vector<OverviewLine> Lines;
   std::string Text;

@@ -9,6 +9,7 @@ namespace tervane {
 
 int RewriteRiverSimulationFile(const std::string& path, std::string_view resultRoot, int useCustomFolder,
                                std::string_view customFolder, std::string& error) {
+  kvfGetErrorGlb();  // what an earlier reader left
   KvfFile* old = kvfLoadFile(path, 1);
   if (kvfGetErrorGlb() != kKvfNoError) {
     error = kvfErrorText();

@@ -4,6 +4,7 @@
 
 #include "core/node.h"
 #include "simspec/model_components.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -11,7 +12,9 @@ namespace tervane {
 class CAirFlowModKvf : public CTvnKvfBase {
  public:
   explicit CAirFlowModKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("Air Flow Simulation Parameters", "AirFlowSimulationParametersMod", parent) {}
+      : CTvnKvfBase("Air Flow Simulation Parameters", "AirFlowSimulationParametersMod", parent) {
+    SetPage(kAirFlowModPage);
+  }
 
   float DensityWater = 1000;
   float DensityAir = 1.777f;  ///< At reference pressure.

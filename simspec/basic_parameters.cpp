@@ -5,6 +5,7 @@
 #include "simspec/air_flow.h"
 #include "simspec/control_parameters.h"
 #include "simspec/model_components.h"
+#include "simspec/pages.h"
 #include "simspec/periods.h"
 #include "simspec/time_step_control.h"
 #include "simspec/titles.h"
@@ -12,6 +13,7 @@
 namespace tervane {
 
 CBasicParaKvf::CBasicParaKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Simulation specification", "SimSpec", parent) {
+  SetPage(kBasicParaPage);
   CYbSEKvfGlobalBase& root = *GetRoot();
   root.RegisterImportantNode(this, "BASICPARAMETERS");
   root.RegisterImportantNode(NewChild<CModelCompKvf>(), "MODELCOMP");

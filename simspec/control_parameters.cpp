@@ -3,6 +3,7 @@
 #include "simspec/control_parameters.h"
 
 #include "simspec/model_components.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -48,6 +49,7 @@ void CCompControlParaUZKvf::ExchangeKeys(KeyExchange& keys) {
 
 CCompControlParaSZKvf::CCompControlParaSZKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("SZ Computational Control Parameters", "CompControlParaSZ", parent) {
+  SetPage(kControlSZPage);
   NewChild<CCompControlParaSZPCGTransKvf>();
   NewChild<CCompControlParaSZPCGSteadyKvf>();
   NewChild<CCompControlParaSZSORKvf>();

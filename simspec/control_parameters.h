@@ -6,6 +6,7 @@
 #pragma once
 
 #include "core/node.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -13,7 +14,9 @@ namespace tervane {
 class CCompControlParaOLKvf : public CTvnKvfBase {
  public:
   explicit CCompControlParaOLKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("OL Computational Control Parameters", "CompControlParaOL", parent) {}
+      : CTvnKvfBase("OL Computational Control Parameters", "CompControlParaOL", parent) {
+    SetPage(kControlOLPage);
+  }
 
   int SolverOption = 0;  ///< 0 successive overrelaxation, 1 explicit.
   int MaxNoOfIter = 200;
@@ -38,7 +41,9 @@ class CCompControlParaOLKvf : public CTvnKvfBase {
 class CCompControlParaUZKvf : public CTvnKvfBase {
  public:
   explicit CCompControlParaUZKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("UZ Computational Control Parameters", "CompControlParaUZ", parent) {}
+      : CTvnKvfBase("UZ Computational Control Parameters", "CompControlParaUZ", parent) {
+    SetPage(kControlUZPage);
+  }
 
   float MaxWaterBalanceError = 0.03f;  ///< Fraction, in one node.
   int MaxNoOfIter = 50;
@@ -140,7 +145,9 @@ class CCompControlParaRivExKvf : public CTvnKvfBase {
 class CCompControlParaColloidWQKvf : public CTvnKvfBase {
  public:
   explicit CCompControlParaColloidWQKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("Colloid Control Parameters", "ColloidControlPara", parent) {}
+      : CTvnKvfBase("Colloid Control Parameters", "ColloidControlPara", parent) {
+    SetPage(kColloidWQPage);
+  }
 
   double ConversionFactor = 0.7;       ///< g metabolite / g pesticide
   double MaxPrecDepthPerTimeStep = 1;  ///< mm

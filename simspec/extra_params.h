@@ -5,6 +5,7 @@
 #include <string>
 
 #include "core/list.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -31,7 +32,9 @@ class CExtraParamsItemKvf : public CTvnKvfBase {
 /// The free list of extra parameters for the engine.
 class CExtraParamsKvf : public CYbSEKvfListBase<CExtraParamsItemKvf>, public CYbSEItemNameSource {
  public:
-  explicit CExtraParamsKvf(CYbSEKvfBase* parent) : CYbSEKvfListBase("Extra Parameters", "ExtraParams", parent) {}
+  explicit CExtraParamsKvf(CYbSEKvfBase* parent) : CYbSEKvfListBase("Extra Parameters", "ExtraParams", parent) {
+    SetPage(kExtraParamsPage);
+  }
 
   int GetSectionUsed() const override;
   std::string GetItemName(int number) const override;

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/node.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -11,6 +12,11 @@ class CIntroductionKvf : public CTvnKvfGroupBase {
  public:
   explicit CIntroductionKvf(CYbSEKvfBase* parent) : CTvnKvfGroupBase("Tervane Flow Model Description", "", parent) {
     SetHelp("Top.chm", "Tvn.htm");
+  }
+
+  const PageClass* GetDlgRuntimeClass(int treeId) const override {
+    const bool shows = treeId == kSetupDataTree || treeId == kProcessedDataTree || treeId == kResultsTree;
+    return shows ? &kHelpPage : nullptr;
   }
 };
 

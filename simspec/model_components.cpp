@@ -9,6 +9,7 @@
 
 #include "simspec/basic_parameters.h"
 #include "simspec/control_parameters.h"
+#include "simspec/pages.h"
 #include "simspec/periods.h"
 #include "simspec/time_step_control.h"
 #include "simspec/titles.h"
@@ -86,6 +87,11 @@ int CModModelCompKvf::GetSubsurfaceModelType() {
   return subsurfaceModelType_;
 }
 
+void CModModelCompKvf::ChooseVariablySaturated(int choice) {
+  VariablySaturated = choice != 0;
+  subsurfaceModelType_ = choice != 0 ? (WithAirFlow ? 3 : 2) : (WithCellRewetting ? 1 : 0);
+}
+
 void CModModelCompKvf::TakeSubsurfaceModelType(int type) {
   if (type == 0 || type == 1) WithCellRewetting = type;
   if (type == 2 || type == 3) WithAirFlow = type == 3;
@@ -128,6 +134,7 @@ bool HasWaterQuality(const CYbSEKvfBase& node, int adPtRadio) {
 CModelCompWQKvf::CModelCompWQKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Water Quality Simulation Specification", "ModelCompWQ", parent) {
   SetAbbreviatedTitle("WQ Simulation Specification");
+  SetPage(kModelCompWQPage);
   NewChild<CSimTitleWQKvf>();
   NewChild<CSimPeriodWQKvf>();
   NewChild<CCompControlParaTimeStepWQKvf>();
@@ -158,6 +165,7 @@ void CModelCompWQKvf::ExchangeKeys(KeyExchange& keys) {
 CModelCompPTKvf::CModelCompPTKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Particle Tracking Specification", "ModelCompPT", parent) {
   SetAbbreviatedTitle("PT Simulation Specification");
+  SetPage(kModelCompPTPage);
   NewChild<CSimTitlePTKvf>();
   NewChild<CSimPeriodPTKvf>();
   NewChild<CCompControlParaPTKvf>();

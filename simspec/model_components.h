@@ -65,6 +65,8 @@ class CModModelCompKvf : public CTvnKvfBase {
   /// 0 without and 1 with cell rewetting, 2 variably saturated, 3 the same with air flow; made from the engine and the
   /// three flags, which follow it.
   int GetSubsurfaceModelType();
+  /// Takes the choice between block centered (0) and variably saturated flow (1) with the engine that knows both.
+  void ChooseVariablySaturated(int choice);
 
   int IsDlgUsedInSetup() override;
 

@@ -72,6 +72,7 @@ bool ReadHotStartData(KvfFile* file, HotStartData& data) {
 int CSimPeriodKvf::LoadHotStartDates(const std::string& path) {
   HotStartDates.clear();
   if (!HotStart || path.empty()) return 0;
+  kvfGetErrorGlb();  // what an earlier reader left
   KvfFile* file = kvfLoadFile(path, 1);
   HotStartData data;
   const bool isRead = kvfGetErrorGlb() == kKvfNoError && ReadHotStartData(file, data);

@@ -7,13 +7,16 @@
 
 #include "core/node.h"
 #include "platform/dates.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
 /// The dates over which a simulation runs, and the stored state that it may start from.
 class CSimPeriodKvf : public CTvnKvfBase {
  public:
-  explicit CSimPeriodKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Simulation period", "SimulationPeriod", parent) {}
+  explicit CSimPeriodKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Simulation period", "SimulationPeriod", parent) {
+    SetPage(kSimPeriodPage);
+  }
 
   int HotStart = 0;
   FileName HotStartResultFile;  ///< A `.tvdres` catalogue.
@@ -60,7 +63,9 @@ class CSimPeriodOnFlowBase : public CTvnKvfBase {
 class CSimPeriodWQKvf : public CSimPeriodOnFlowBase {
  public:
   explicit CSimPeriodWQKvf(CYbSEKvfBase* parent)
-      : CSimPeriodOnFlowBase("Water Quality Simulation Period", "WQ Simulation Period", "SimulationPeriodWQ", parent) {}
+      : CSimPeriodOnFlowBase("Water Quality Simulation Period", "WQ Simulation Period", "SimulationPeriodWQ", parent) {
+    SetPage(kSimPeriodWQPage);
+  }
 };
 
 class CSimPeriodPTKvf : public CSimPeriodOnFlowBase {
@@ -68,6 +73,7 @@ class CSimPeriodPTKvf : public CSimPeriodOnFlowBase {
   explicit CSimPeriodPTKvf(CYbSEKvfBase* parent)
       : CSimPeriodOnFlowBase("Particle Tracking Simulation Period", "PT Simulation Period", "SimulationPeriodPT",
                              parent) {
+    SetPage(kSimPeriodPTPage);
     if (GetRoot()) GetRoot()->RegisterImportantNode(this, "PT_SIM_PERIOD");
   }
 };

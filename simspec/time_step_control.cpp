@@ -3,6 +3,7 @@
 #include "simspec/time_step_control.h"
 
 #include "simspec/model_components.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -27,6 +28,7 @@ void CCompControlParaTimeStepKvf::ExchangeKeys(KeyExchange& keys) {
 CCompControlParaTimeStepWQKvf::CCompControlParaTimeStepWQKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Water Quality Time Step Control", "WQTSC", parent) {
   SetAbbreviatedTitle("WQ Time Step Control");
+  SetPage(kTimeStepWQPage);
 }
 
 void CCompControlParaTimeStepWQKvf::ExchangeKeys(KeyExchange& keys) {
@@ -45,6 +47,7 @@ void CCompControlParaTimeStepWQKvf::ExchangeKeys(KeyExchange& keys) {
 CCompControlParaPTKvf::CCompControlParaPTKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Particle Tracking Control", "PTControl", parent) {
   SetAbbreviatedTitle("PT Control");
+  SetPage(kControlPTPage);
 }
 
 void CCompControlParaPTKvf::ExchangeKeys(KeyExchange& keys) {

@@ -5,13 +5,16 @@
 #pragma once
 
 #include "core/node.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
 class CCompControlParaTimeStepKvf : public CTvnKvfBase {
  public:
   explicit CCompControlParaTimeStepKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("Time step control", "CompControlParaTimeStep", parent) {}
+      : CTvnKvfBase("Time step control", "CompControlParaTimeStep", parent) {
+    SetPage(kTimeStepPage);
+  }
 
   float InitialTimeStep = 6;
   float MaxAllowedOLTimeStep = 0.5f;

@@ -5,6 +5,7 @@
 #include <string>
 
 #include "core/node.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -28,19 +29,25 @@ class CSimTitleBase : public CTvnKvfBase {
 
 class CSimTitleKvf : public CSimTitleBase {
  public:
-  explicit CSimTitleKvf(CYbSEKvfBase* parent) : CSimTitleBase("Simulation title", "", "SimTitle", parent) {}
+  explicit CSimTitleKvf(CYbSEKvfBase* parent) : CSimTitleBase("Simulation title", "", "SimTitle", parent) {
+    SetPage(kSimTitlePage);
+  }
 };
 
 class CSimTitleWQKvf : public CSimTitleBase {
  public:
   explicit CSimTitleWQKvf(CYbSEKvfBase* parent)
-      : CSimTitleBase("Water Quality Simulation Title", "WQ Simulation Title", "SimTitleWQ", parent) {}
+      : CSimTitleBase("Water Quality Simulation Title", "WQ Simulation Title", "SimTitleWQ", parent) {
+    SetPage(kSimTitleWQPage);
+  }
 };
 
 class CSimTitlePTKvf : public CSimTitleBase {
  public:
   explicit CSimTitlePTKvf(CYbSEKvfBase* parent)
-      : CSimTitleBase("Particle Tracking Simulation Title", "PT Simulation Title", "SimTitlePT", parent) {}
+      : CSimTitleBase("Particle Tracking Simulation Title", "PT Simulation Title", "SimTitlePT", parent) {
+    SetPage(kSimTitlePTPage);
+  }
 };
 
 }  // namespace tervane

@@ -151,6 +151,17 @@ TEST(CommandLine, GetAndShowTellValuesAsTheyWouldBeSaved) {
   EXPECT_THAT(Tervane({"show", file}).out, HasSubstr("SimTitle"));
 }
 
+TEST(CommandLine, PageShowsTheControlsOfANode) {
+  const TempFolder folder;
+  const std::string file = folder.File("a.tvd");
+  Tervane({"new", file});
+  const Outcome outcome = Tervane({"page", file, "SimSpec/SimTitle"});
+  EXPECT_EQ(outcome.status, kDone);
+  EXPECT_EQ(outcome.out, "text \"Simulation Title:\" = \nlong text \"Simulation Description:\" = \n");
+  EXPECT_THAT(Tervane({"page", file, "CIntroductionKvf"}).out, HasSubstr("<h1>Tervane</h1>"));
+  EXPECT_EQ(Tervane({"page", file, "FlowModelDocVersion"}).status, kCouldNot);
+}
+
 TEST(CommandLine, APlaceThatIsNotThereIsToldWithWhatComesNear) {
   const TempFolder folder;
   const std::string file = folder.File("a.tvd");
@@ -379,7 +390,8 @@ TEST(CommandLine, AnUnknownCommandOrAMissingArgumentIsTold) {
     EXPECT_EQ(outcome.status, kCouldNot);
     EXPECT_THAT(outcome.err, Not(IsEmpty()));
   }
-  for (const char* command : {"new", "check", "tree", "show", "get", "set", "convert", "diff", "keys", "completion"})
+  for (const char* command :
+       {"new", "check", "tree", "show", "page", "get", "set", "convert", "diff", "keys", "completion"})
     EXPECT_THAT(Tervane({command, "--help"}).out, HasSubstr("Usage: tervane " + std::string(command)));
 }
 

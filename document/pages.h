@@ -1,0 +1,13 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The pages of the document's own nodes, by the names and resource numbers under which a shell knows them.
+#pragma once
+
+#include "core/page_class.h"
+
+namespace tervane {
+
+inline constexpr PageClass kOverviewPage{"COverviewDlg", 16535};
+
+}  // namespace tervane

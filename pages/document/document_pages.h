@@ -1,0 +1,43 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include "document/overview.h"
+#include "exchange/overlays.h"
+#include "pages/page.h"
+
+namespace tervane {
+
+/// Shows the help page of a node whose information is a text.
+class CTvnHelpView : public PageOf<CYbSEKvfBase> {
+ public:
+  using PageOf::PageOf;
+
+  /// The name of the help page that is shown: the node's own, or "default.htm" where the program holds none of that
+  /// name.
+  std::string PageName() const;
+
+ protected:
+  void Describe(PageForm& form) override;
+};
+
+/// The whole setup as a text to read.
+class COverviewDlg : public PageOf<COverviewKvf> {
+ public:
+  using PageOf::PageOf;
+  void Initialize() override;
+
+ protected:
+  void Describe(PageForm& form) override;
+};
+
+/// What the maps show.
+class CDisplayDlg : public PageOf<COverlaysKvf> {
+ public:
+  using PageOf::PageOf;
+
+ protected:
+  void Describe(PageForm& form) override;
+};
+
+}  // namespace tervane

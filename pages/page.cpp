@@ -1,0 +1,56 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/page.h"
+
+#include <fmt/format.h>
+
+#include "pages/table_form.h"
+#include "platform/text.h"
+
+namespace tervane {
+
+void CYbSEDlgBase::Initialize() {
+  form_ = std::make_unique<PageForm>(node_);
+  Describe(*form_);
+  SetData();
+}
+
+void CYbSEDlgBase::UpdateDoc(int hint, const std::string& action) const {
+  if (context_.updateDoc) context_.updateDoc(hint, action);
+}
+
+namespace {
+
+/// A label as the name of an action: "Start Date:" gives "Start Date".
+std::string ActionName(std::string_view label) {
+  std::string name = Replaced(label, "\n", " ");
+  while (!name.empty() && (name.back() == ':' || name.back() == ' ')) name.pop_back();
+  return name;
+}
+
+}  // namespace
+
+std::string CYbSEDlgBase::Enter(Control& control, const std::string& typed) {
+  if (!control.enter || !control.IsEnabled()) return "this value cannot be changed here";
+  if (control.Text() == typed) return {};
+  if (std::string expected = control.enter(typed); !expected.empty()) return expected;
+  if (control.revalidates && node_.GetRoot()) node_.GetRoot()->ReValidate();
+  if (control.revalidatesLater) node_.SetRevalidateAll();
+  SetData();
+  UpdateDoc(control.hint, fmt::format("Change {}", ActionName(control.label.empty() ? control.key : control.label)));
+  return {};
+}
+
+void CYbSEDlgBase::Press(const Control& control) const {
+  if (control.press && control.IsEnabled()) control.press();
+}
+
+std::string CYbSEDlgBase::EnterCell(const Control& table, int row, int column, const std::string& typed) {
+  if (table.table->Cell(row, column) == typed) return {};
+  if (std::string expected = table.table->Enter(row, column, typed); !expected.empty()) return expected;
+  UpdateDoc(kDataChanged,
+            fmt::format("Change {}", ActionName(table.table->Columns()[static_cast<std::size_t>(column - 1)].head)));
+  return {};
+}
+
+}  // namespace tervane

@@ -1,0 +1,65 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <string>
+
+#include "core/document.h"
+#include "pages/page_form.h"
+#include "platform/host.h"
+
+namespace tervane {
+
+/// What a page needs of the program around it.
+struct PageContext {
+  CYbSEDocument& document;
+  Host& host;
+  /// Marks the document modified and makes the views follow; `action` names what the user did ("Change End Date").
+  std::function<void(int hint, const std::string& action)> updateDoc;
+};
+
+/// A page: edits one node and holds no values of its own.
+class CYbSEDlgBase {
+ public:
+  CYbSEDlgBase(CYbSEKvfBase& node, PageContext context) : node_(node), context_(std::move(context)) {}
+  virtual ~CYbSEDlgBase() = default;
+
+  CYbSEKvfBase& Node() const { return node_; }
+  /// Called once, before the page is shown the first time: makes the form.
+  virtual void Initialize();
+  /// Called when the page is shown and after every change: what the form's rules do not say themselves.
+  virtual void SetData() {}
+  PageForm& Form() const { return *form_; }
+
+  /// Types a value into a control. Gives what was expected when the control refuses it; the node is then unchanged.
+  std::string Enter(Control& control, const std::string& typed);
+  void Press(const Control& control) const;
+  /// Types into a cell of a table.
+  std::string EnterCell(const Control& table, int row, int column, const std::string& typed);
+
+  void UpdateDoc(int hint, const std::string& action) const;
+
+ protected:
+  virtual void Describe(PageForm& form) = 0;
+  const PageContext& Context() const { return context_; }
+
+ private:
+  CYbSEKvfBase& node_;
+  PageContext context_;
+  std::unique_ptr<PageForm> form_;
+};
+
+/// A page of one node class.
+template <class NodeClass>
+class PageOf : public CYbSEDlgBase {
+ public:
+  PageOf(CYbSEKvfBase& node, PageContext context) : CYbSEDlgBase(node, std::move(context)) {}
+  NodeClass& Node() const { return static_cast<NodeClass&>(CYbSEDlgBase::Node()); }
+};
+
+/// The page of a node by its class; null when the class is unknown or the node is of another class than the page edits.
+std::unique_ptr<CYbSEDlgBase> MakePage(const PageClass& page, CYbSEKvfBase& node, PageContext context);
+
+}  // namespace tervane

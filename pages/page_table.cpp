@@ -1,0 +1,68 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <array>
+
+#include "document/overview.h"
+#include "document/pages.h"
+#include "exchange/overlays.h"
+#include "exchange/pages.h"
+#include "pages/document/document_pages.h"
+#include "pages/page.h"
+#include "pages/simspec/components_pages.h"
+#include "pages/simspec/control_pages.h"
+#include "pages/simspec/period_pages.h"
+#include "simspec/pages.h"
+
+namespace tervane {
+
+namespace {
+
+struct PageRow {
+  const PageClass& page;
+  std::unique_ptr<CYbSEDlgBase> (*make)(CYbSEKvfBase& node, PageContext context);
+};
+
+template <class Page, class Node>
+std::unique_ptr<CYbSEDlgBase> Make(CYbSEKvfBase& node, PageContext context) {
+  if constexpr (!std::is_same_v<Node, CYbSEKvfBase>)
+    if (!dynamic_cast<Node*>(&node)) return nullptr;
+  return std::make_unique<Page>(node, std::move(context));
+}
+
+const std::array kPages{
+    PageRow{kHelpPage, Make<CTvnHelpView, CYbSEKvfBase>},
+    PageRow{kOverviewPage, Make<COverviewDlg, COverviewKvf>},
+    PageRow{kDisplayPage, Make<CDisplayDlg, COverlaysKvf>},
+    PageRow{kBasicParaPage, Make<CBasicParaDlg, CBasicParaKvf>},
+    PageRow{kModelCompWQPage, Make<CModelCompWQDlg, CModelCompWQKvf>},
+    PageRow{kModelCompPTPage, Make<CModelCompPTDlg, CModelCompPTKvf>},
+    PageRow{kSimTitlePage, Make<CSimTitleDlg, CSimTitleBase>},
+    PageRow{kSimTitleWQPage, Make<CSimTitleDlg, CSimTitleBase>},
+    PageRow{kSimTitlePTPage, Make<CSimTitleDlg, CSimTitleBase>},
+    PageRow{kSimPeriodPage, Make<CSimPeriodDlg, CSimPeriodKvf>},
+    PageRow{kSimPeriodWQPage, Make<CSimPeriodOnFlowDlg, CSimPeriodOnFlowBase>},
+    PageRow{kSimPeriodPTPage, Make<CSimPeriodOnFlowDlg, CSimPeriodOnFlowBase>},
+    PageRow{kAirFlowModPage, Make<CAirFlowModDlg, CAirFlowModKvf>},
+    PageRow{kExtraParamsPage, Make<CExtraParamsDlg, CExtraParamsKvf>},
+    PageRow{kTimeStepPage, Make<CCompControlParaTimeStepDlg, CCompControlParaTimeStepKvf>},
+    PageRow{kTimeStepWQPage, Make<CCompControlParaTimeStepWQDlg, CCompControlParaTimeStepWQKvf>},
+    PageRow{kColloidWQPage, Make<CCompControlParaColloidWQDlg, CCompControlParaColloidWQKvf>},
+    PageRow{kControlPTPage, Make<CCompControlParaPTDlg, CCompControlParaPTKvf>},
+    PageRow{kControlOLPage, Make<CCompControlParaOLDlg, CCompControlParaOLKvf>},
+    PageRow{kControlUZPage, Make<CCompControlParaUZDlg, CCompControlParaUZKvf>},
+    PageRow{kControlSZPage, Make<CCompControlParaSZDlg, CCompControlParaSZKvf>},
+};
+
+}  // namespace
+
+std::unique_ptr<CYbSEDlgBase> MakePage(const PageClass& page, CYbSEKvfBase& node, PageContext context) {
+  for (const PageRow& row : kPages) {
+    if (row.page.name != page.name) continue;
+    std::unique_ptr<CYbSEDlgBase> made = row.make(node, std::move(context));
+    if (made) made->Initialize();
+    return made;
+  }
+  return nullptr;
+}
+
+}  // namespace tervane

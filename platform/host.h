@@ -1,0 +1,42 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What a page or a document asks of the program around it: a desktop implements it with windows, the command line on
+// the terminal, a test with a script of expected questions and answers.
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace tervane {
+
+class Host {
+ public:
+  virtual ~Host() = default;
+
+  enum class Icon { Information, Warning, Error, Question };
+  enum class Buttons { Ok, OkCancel, YesNo, YesNoCancel };
+  enum class Answer { Ok, Cancel, Yes, No };
+  virtual Answer Ask(const std::string& text, Icon icon, Buttons buttons) = 0;
+  void Tell(const std::string& text, Icon icon) { Ask(text, icon, Buttons::Ok); }
+
+  /// What a file dialog shows. The filter is a list of text and patterns in turn, as "Grid file (*.nds2)|*.nds2||".
+  struct FileQuestion {
+    std::string title;
+    std::string filter;
+    std::string defaultExtension;  ///< Without its dot.
+    std::string current;           ///< What is chosen at first; may be empty.
+  };
+  /// The chosen path, or nothing when the user gave up.
+  virtual std::optional<std::string> AskFileToOpen(const FileQuestion& question) = 0;
+  virtual std::optional<std::string> AskFileToSave(const FileQuestion& question) = 0;
+
+  virtual void OpenBrowser(const std::string& address) = 0;
+
+  /// A setting of the program, "" when it was never set.
+  virtual std::string Setting(const std::string& name) const = 0;
+  virtual void SetSetting(const std::string& name, const std::string& value) = 0;
+};
+
+}  // namespace tervane

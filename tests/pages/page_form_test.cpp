@@ -1,0 +1,100 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/page_form.h"
+
+#include <gmock/gmock.h>
+
+#include "tests/support/page_driver.h"
+#include "tests/support/setup.h"
+
+namespace tervane {
+namespace {
+
+using test::PageDriver;
+using test::SetupText;
+using test::ValueOf;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+
+TEST(PageForm, ATypedValueReachesTheNodeOrIsRefusedAndChangesNothing) {
+  struct Case {
+    const char *path, *label, *typed, *key, *value, *expected;
+  };
+  const Case cases[] = {
+      {"SimSpec/SimTitle", "Simulation Title:", "Karup \"2\"", "SimSpec/SimTitle:Title", "Karup \"2\"", ""},
+      {"SimSpec/CompControlParaOL", "Maximum number of iterations:", " 77 ", "SimSpec/CompControlParaOL:MaxNoOfIter",
+       "77", ""},
+      {"SimSpec/CompControlParaOL", "Maximum number of iterations:", "7.5", "SimSpec/CompControlParaOL:MaxNoOfIter",
+       "200", "a whole number"},
+      {"SimSpec/CompControlParaTimeStep", "Initial time step", "1e-2",
+       "SimSpec/CompControlParaTimeStep:InitialTimeStep", "0.01", ""},
+      {"SimSpec/CompControlParaTimeStep", "Initial time step", "0,5", "SimSpec/CompControlParaTimeStep:InitialTimeStep",
+       "6", "a number with a point"},
+      {"SimSpec/CompControlParaTimeStep", "Initial time step", "1e39",
+       "SimSpec/CompControlParaTimeStep:InitialTimeStep", "6", "a number"},
+      {"SimSpec/SimulationPeriod", "End Date:", "2001-12-31", "SimSpec/SimulationPeriod:SIMEND", "2001, 12, 31, 0, 0",
+       ""},
+      {"SimSpec/SimulationPeriod", "End Date:", "2001/02/28  06:30", "SimSpec/SimulationPeriod:SIMEND",
+       "2001, 2, 28, 6, 30", ""},
+      {"SimSpec/SimulationPeriod", "End Date:", "2001/02/29", "SimSpec/SimulationPeriod:SIMEND", "2000, 2, 1, 0, 0",
+       "a date as"},
+      {"SimSpec", "Numeric Engine", "3", "SimSpec:ModelType", "3", ""},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(std::string(c.label) + " " + c.typed);
+    CFlowModelDoc document;
+    PageDriver page(document, c.path);
+    EXPECT_THAT(page.Enter(c.label, c.typed), HasSubstr(c.expected));
+    EXPECT_EQ(ValueOf(document, c.key), c.value);
+    EXPECT_EQ(page.Changes().empty(), *c.expected != '\0');
+  }
+}
+
+TEST(PageForm, APickedFileIsStoredRelativeToTheSetup) {
+  CFlowModelDoc document;
+  ASSERT_TRUE(document.OpenText(
+      SetupText(14, "section SimSpec {\nsection ModelComp {\nWQ = 1\nUseCurrentWmSimulation = 0\n}\n}"),
+      "/data/karup/a.tvd"));
+  PageDriver page(document, "SimSpec");
+  const struct {
+    const char *typed, *stored;
+  } cases[] = {{"/data/karup/results/x.tvdres", "results/x.tvdres"},
+               {"/data/other/x.tvdres", "/data/other/x.tvdres"},
+               {"C:\\x.tvdres", "C:/x.tvdres"},
+               {"results\\y.tvdres", "results\\y.tvdres"},
+               {"", ""}};
+  for (const auto& c : cases) {
+    EXPECT_EQ(page.Enter("Flow result catalogue file:", c.typed), "");
+    EXPECT_EQ(ValueOf(document, "SimSpec/ModelComp:FilenameTvdRes"), c.stored);
+  }
+}
+
+TEST(PageForm, ChangesAreNamedAfterTheirControlAndGiveTheirHint) {
+  CFlowModelDoc document;
+  PageDriver period(document, "SimSpec/SimulationPeriod");
+  period.Enter("End Date:", "2001-01-01");
+  period.Enter("End Date:", "2001/01/01  00:00");  // what stands there already
+  EXPECT_THAT(period.Changes(), ElementsAre("1 Change End Date"));
+  EXPECT_TRUE(document.Root().TakeRevalidateAll());
+  PageDriver engine(document, "SimSpec");
+  engine.Enter("Numeric Engine", "1");
+  EXPECT_THAT(engine.Changes(), ElementsAre("8 Change Numeric Engine"));
+}
+
+TEST(PageForm, ADisabledControlRefusesWhatIsTyped) {
+  CFlowModelDoc document;
+  PageDriver page(document, "SimSpec/CompControlParaOL");
+  EXPECT_THAT(page.Enter("Maximum courant number: [0.1 - 0.9]", "0.5"), testing::Not(IsEmpty()));
+  EXPECT_EQ(ValueOf(document, "SimSpec/CompControlParaOL:MaxCourant_Explicit"), "0.8");
+}
+
+TEST(PageForm, AValueOutsideItsListIsShownAsItIs) {
+  CFlowModelDoc document;
+  ASSERT_TRUE(document.OpenText(SetupText(14, "section SimSpec {\nModelType = 7\n}"), "a.tvd"));
+  PageDriver page(document, "SimSpec");
+  EXPECT_THAT(page.Text(), HasSubstr("choice \"Numeric Engine\" = 7 (not in the list) of [Tervane | "));
+}
+
+}  // namespace
+}  // namespace tervane

@@ -1,0 +1,43 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "tests/support/page_driver.h"
+
+#include <stdexcept>
+
+#include <fmt/format.h>
+
+namespace tervane::test {
+
+namespace {
+
+[[noreturn]] void Unexpected(const std::string& question) { throw std::runtime_error("nobody expected: " + question); }
+
+}  // namespace
+
+Host::Answer NoQuestions::Ask(const std::string& text, Icon, Buttons) { Unexpected(text); }
+std::optional<std::string> NoQuestions::AskFileToOpen(const FileQuestion& question) { Unexpected(question.title); }
+std::optional<std::string> NoQuestions::AskFileToSave(const FileQuestion& question) { Unexpected(question.title); }
+void NoQuestions::OpenBrowser(const std::string& address) { Unexpected(address); }
+std::string NoQuestions::Setting(const std::string&) const { return {}; }
+void NoQuestions::SetSetting(const std::string& name, const std::string&) { Unexpected(name); }
+
+PageDriver::PageDriver(CFlowModelDoc& document, std::string_view path) {
+  CYbSEKvfBase* node = FindNode(document.Root(), ParseSetupPath(path).steps);
+  const PageClass* pageClass = node ? node->GetDlgRuntimeClass(kSetupDataTree) : nullptr;
+  if (pageClass)
+    page_ = MakePage(*pageClass, *node, {document, host_, [this](int hint, const std::string& action) {
+                                           changes_.push_back(fmt::format("{} {}", hint, action));
+                                         }});
+  if (!page_) throw std::runtime_error(fmt::format("{} has no page", path));
+}
+
+Control& PageDriver::Find(std::string_view label) {
+  Control* found = nullptr;
+  page_->Form().ForEach([&](Control& control) {
+    if (!found && (control.label == label || (control.label.empty() && control.key == label))) found = &control;
+  });
+  if (!found) throw std::runtime_error(fmt::format("the page has no {}", label));
+  return *found;
+}
+
+}  // namespace tervane::test
