@@ -34,6 +34,7 @@ const PageClass* PageClassOf(const CYbSEKvfBase& node) {
 int PageCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
+  TellThatThereIsAReport(document, streams);
   CYbSEKvfBase* node = FindNodeOrTell(document, ParseSetupPath(typed), typed, streams);
   if (!node) return kCouldNot;
   const PageClass* pageClass = PageClassOf(*node);

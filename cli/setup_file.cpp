@@ -28,6 +28,13 @@ void TellReport(const CFlowModelDoc& document, Streams streams) {
     fmt::print(streams.err, "{}:{}: {}\n", document.PathName(), unread.line, unread.text);
 }
 
+void TellThatThereIsAReport(const CFlowModelDoc& document, Streams streams) {
+  const LoadReport& report = document.Report();
+  if (report.IsEmpty()) return;
+  fmt::print(streams.err, "{}: {} notes of the reading, {} things that nothing reads: tervane check tells them\n",
+             document.PathName(), report.entries.size(), report.unread.size());
+}
+
 namespace {
 
 /// ", did you mean X?" for the name that comes nearest, or nothing.

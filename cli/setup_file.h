@@ -12,8 +12,10 @@ namespace tervane {
 /// Opens a setup; tells on the error stream why that failed.
 bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams);
 
-/// Tells what the user should know of the loading, a line each; for commands whose result is something else.
+/// Tells what the user should know of the loading, a line each; for commands that write or compare.
 void TellReport(const CFlowModelDoc& document, Streams streams);
+/// The same in one line, for commands that only show something.
+void TellThatThereIsAReport(const CFlowModelDoc& document, Streams streams);
 
 /// A place as a person types it, found in a tree; null, with a message that names what comes near, when it is not
 /// there.

@@ -16,6 +16,7 @@ namespace tervane {
 int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
+  TellThatThereIsAReport(document, streams);
   std::vector<std::string> json;
   WalkNodes(document.Root(), [&](const NodePlace& place) {
     if (!all && !place.takesPart) return;
@@ -62,6 +63,7 @@ void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyRefe
 int ShowCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
+  TellThatThereIsAReport(document, streams);
   const SetupPath path = ParseSetupPath(typed);
   const CYbSEKvfBase* wanted = FindNodeOrTell(document, path, typed, streams);
   if (!wanted) return kCouldNot;

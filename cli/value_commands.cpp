@@ -18,6 +18,7 @@ namespace tervane {
 int GetCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
+  TellThatThereIsAReport(document, streams);
   const SetupPath path = ParseSetupPath(typed);
   const CYbSEKvfBase* node = FindNodeOrTell(document, path, typed, streams);
   if (!node) return kCouldNot;

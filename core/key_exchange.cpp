@@ -50,6 +50,30 @@ void KeyExchange::Describe(const Rule& rule, std::string_view type, const void* 
                     rule.since, rule.until, rule.written, member});
 }
 
+template <class Value>
+void KeyExchange::Several(std::string_view key, std::vector<Value>& values) {
+  if (IsReading()) {
+    const KvfNode* keyword = kvfKeywordByNameNum(section_, key, 1);
+    if (!keyword) return;
+    std::vector<Value> read(keyword->count);
+    for (std::uint32_t i = 0; i < keyword->count; ++i)
+      if (!kvfGetParam(section_, key, &read[i], 1, static_cast<int>(i) + 1)) return;
+    values = std::move(read);
+    return;
+  }
+  kvfAddKeyword(file_, key);
+  for (const Value& value : values) {
+    if constexpr (std::is_same_v<Value, int>)
+      kvfAddInt(file_, value);
+    else
+      kvfAddString(file_, value);
+  }
+  if (keys_) Describe({key}, std::is_same_v<Value, int> ? "int list" : "string list", &values);
+}
+
+template void KeyExchange::Several(std::string_view key, std::vector<int>& values);
+template void KeyExchange::Several(std::string_view key, std::vector<std::string>& values);
+
 void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
   int year = value.Year(), month = value.Month(), day = value.Day();
   if (IsReading()) {

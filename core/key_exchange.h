@@ -86,6 +86,9 @@ class KeyExchange {
     auto value = get();
     if (Exchange({key}, value)) set(value);
   }
+  /// All parameters of one keyword, whole numbers or texts. One of another type leaves the values as they were.
+  template <class Value>
+  void Several(std::string_view key, std::vector<Value>& values);
   /// The date alone: year, month, day.
   void Day(std::string_view key, CYbDateTime& value);
   /// The number of items of a list; reading resizes it.
