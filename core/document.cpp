@@ -63,7 +63,7 @@ bool CYbSEDocument::LoadTree(KvfFile* file, const std::string& path) {
 
   int useCustom = 0;
   std::string folder;
-  kvfGetProjectResultRoot(file);
+  if (const char* resultRoot = kvfGetProjectResultRoot(file)) projectResultRoot_ = FileName(resultRoot, file->folder);
   kvfGetCustomResultFolder(file, &useCustom, &folder);
   UseCustomResultFolder = useCustom != 0;
   CustomResultFolder = FileName(folder, file->folder);
@@ -73,7 +73,7 @@ bool CYbSEDocument::LoadTree(KvfFile* file, const std::string& path) {
         {LoadReport::Kind::Note, note.line, std::move(note.path), std::move(note.key), std::move(note.text)});
   report_.unread = CollectUnread(*file);
   original_.version = root_->ReadDocVersion();
-  original_.mustBeKept = !report_.unread.empty() || original_.version != CFlowModelDocVersionKvf::kWrittenVersion;
+  original_.mustBeKept = !report_.IsEmpty() || original_.version != CFlowModelDocVersionKvf::kWrittenVersion;
   OnLoaded();
   modified_ = false;
   return true;
@@ -83,6 +83,7 @@ KvfFile* CYbSEDocument::BuildFile(const std::string& folder) const {
   KvfFile* file = kvfCreate();
   file->folder = folder;
   root_->Save(file);
+  if (!projectResultRoot_.IsEmpty()) kvfSetProjectResultRoot(file, projectResultRoot_.TextIn(folder));
   if (UseCustomResultFolder || !CustomResultFolder.IsEmpty())
     kvfSetCustomResultFolder(file, UseCustomResultFolder, CustomResultFolder.TextIn(folder));
   return file;

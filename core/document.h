@@ -47,7 +47,8 @@ class CYbSEDocument {
   /// The same from a text in memory; `path` stands for its place in messages and names.
   bool OpenText(std::string_view text, const std::string& path);
   /// Saves under that path, atomically. The first save over the file that was read keeps that file beside it when it
-  /// holds what nothing reads or was written by an older version. False when it failed; the old file then stands.
+  /// was written by another version, or when its reading left something to report. False when it failed; the old file
+  /// then stands.
   virtual bool OnSaveDocument(const std::string& path);
   const std::string& Error() const { return error_; }
   /// This document holds a changed copy of `other`, and will be saved in its place.
@@ -84,7 +85,8 @@ class CYbSEDocument {
   std::unique_ptr<CYbSEKvfGlobalBase> root_;
   std::string path_;
   std::string error_;
-  std::string header_;  ///< Comments in front of the first target.
+  std::string header_;          ///< Comments in front of the first target.
+  FileName projectResultRoot_;  ///< As the file holds it, for other programs.
   LoadReport report_;
   std::vector<std::string> saveNotes_;
   bool modified_ = false;

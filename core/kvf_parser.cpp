@@ -11,7 +11,8 @@
 //   string  = '"' with the escapes \" \\ \n \r \t \u{hex} '"'
 //   comment = "#" up to the end of the line
 //
-// Blanks and tabs may stand between all of these; line ends too, but not within a keyword, except behind a comma.
+// Blanks and tabs may stand between all of these; line ends too, but neither in front of the name of a target or
+// section, nor within a keyword, except behind a comma.
 #include "core/kvf_parser.h"
 
 #include <algorithm>

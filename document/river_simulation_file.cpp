@@ -21,7 +21,7 @@ int RewriteRiverSimulationFile(const std::string& path, std::string_view resultR
     KvfNode* target = kvfTargetByNum(old, n);
     const char* name = kvfGetName(target);
     if (EqualIgnoringCase(name, "SYSTEM")) continue;
-    kvfAddTarget(file, name);
+    kvfAddTarget(file, target->WrittenName());
     kvfEndSection(file);
     kvfCopy(target, kvfTargetByNum(file, kvfGetNoTargets(file)));
   }

@@ -62,6 +62,12 @@ TEST(FlowModelDocument, KeepsTheCustomResultFolderInTheFile) {
   EXPECT_TRUE(reopened.Report().IsEmpty());
   EXPECT_EQ(reopened.getResultFolder(), folder.Path() + "/out/run1");
 
+  // What other programs stored beside it stays.
+  const std::string root = "target SYSTEM {\n  ProjectResultRoot = file \"D:\\\\runs\"\n}\n";
+  CFlowModelDoc withRoot;
+  ASSERT_TRUE(withRoot.OpenText(SetupText(14, "") + root, path));
+  EXPECT_THAT(SavedText(withRoot), testing::EndsWith(root));
+
   reopened.UseCustomResultFolder = false;
   EXPECT_EQ(reopened.getResultFolder(), folder.Path() + "/a_results");
 }
@@ -101,6 +107,7 @@ TEST(FlowModelDocument, KeepsTheOriginalAtTheFirstSaveOverWhatItWouldLose) {
       {"no version", SetupText(-1, ""), "a.vnone.tvd"},
       {"a key that nothing reads", SetupText(14, "section SimSpec {\nModleType = 1\n}"), "a.v14.tvd"},
       {"a comment behind the first target", SetupText(14, "# mine"), "a.v14.tvd"},
+      {"a value of another type", SetupText(14, "section SimSpec {\nModelType = \"one\"\n}"), "a.v14.tvd"},
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.what);
