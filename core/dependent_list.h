@@ -19,6 +19,15 @@
 
 namespace tervane {
 
+/// Somebody whose links to other nodes a change may change; undoing puts them back.
+class LinkHolder {
+ public:
+  virtual ~LinkHolder() = default;
+  /// The links as addresses, in an order of their own.
+  virtual std::vector<void*> Links() const = 0;
+  virtual void SetLinks(const std::vector<void*>& links) = 0;
+};
+
 /// A list that can be told that something changed.
 class CTvnDependentListBase {
  public:
@@ -36,10 +45,8 @@ class CTvnDependentListBase {
 };
 
 /// What a list may ask of an entry.
-class CTvnItemInterface {
+class CTvnItemInterface : public LinkHolder {
  public:
-  virtual ~CTvnItemInterface() = default;
-
   /// The master entry's circumstances changed; `number` is the place of what it refers to in `list`, 0 for none.
   virtual void OnMasterChanged(CTvnDependentListBase* /*list*/, int /*number*/) {}
   virtual const std::string& GetName() const = 0;
@@ -60,6 +67,11 @@ class CTvnAbstractItemBase : public CTvnItemInterface {
   virtual void SetId(int id) { id_ = id; }
 
   const std::vector<Item*>& LinkedItems() const { return linkedItems_; }
+  std::vector<void*> Links() const override { return {linkedItems_.begin(), linkedItems_.end()}; }
+  void SetLinks(const std::vector<void*>& links) override {
+    linkedItems_.clear();
+    for (void* link : links) linkedItems_.push_back(static_cast<Item*>(link));
+  }
   /// Passes a master entry's new name on.
   void RenameLinked(const std::string& name) {
     for (Item* item : linkedItems_) item->SetName(name);
@@ -72,7 +84,7 @@ class CTvnAbstractItemBase : public CTvnItemInterface {
 
 /// A master or a dependent list of entries with the interface `Item`; `List` is the class that derives from this.
 template <class List, class Item>
-class CTvnAbstractListBase : public CTvnDependentListBase {
+class CTvnAbstractListBase : public CTvnDependentListBase, public LinkHolder {
  public:
   using ItemBase = Item;
 
@@ -96,6 +108,11 @@ class CTvnAbstractListBase : public CTvnDependentListBase {
   virtual void LinkNewItem(Item* /*masterItem*/) {}
 
   const std::vector<List*>& DependentLists() const { return dependentLists_; }
+  std::vector<void*> Links() const override { return {dependentLists_.begin(), dependentLists_.end()}; }
+  void SetLinks(const std::vector<void*>& links) override {
+    dependentLists_.clear();
+    for (void* link : links) dependentLists_.push_back(static_cast<List*>(link));
+  }
 
  private:
   std::vector<List*> dependentLists_;

@@ -20,6 +20,7 @@ class FileName {
   }
 
   const std::string& Text() const { return text_; }
+  const std::string& Folder() const { return folder_; }
   bool IsEmpty() const { return text_.empty(); }
   /// What to open: absolute when the folder is known. Empty stays empty.
   std::string Absolute() const { return ResolvedPath(text_, folder_); }

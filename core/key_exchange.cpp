@@ -37,6 +37,19 @@ KeyExchange KeyExchange::Describing(std::vector<KeyInfo>& described, int docVers
   return keys;
 }
 
+KeyExchange KeyExchange::Keeping(StateBuffer& state) {
+  KeyExchange keys;
+  keys.state_ = &state;
+  keys.docVersion_ = KeyInfo::kNoLimit;  // no rule of an old version holds
+  return keys;
+}
+
+KeyExchange KeyExchange::Restoring(StateBuffer& state) {
+  KeyExchange keys = Keeping(state);
+  keys.isRestoring_ = true;
+  return keys;
+}
+
 bool KeyExchange::Reads(const Rule& rule) {
   if (docVersion_ >= rule.since && docVersion_ <= rule.until) return true;
   kvfMarkKnown(section_, rule.key);
@@ -52,6 +65,7 @@ void KeyExchange::Describe(const Rule& rule, std::string_view type, const void* 
 
 template <class Value>
 void KeyExchange::Several(std::string_view key, std::vector<Value>& values) {
+  if (state_) return void(ExchangeState({key}, values));
   if (IsReading()) {
     const KvfNode* keyword = kvfKeywordByNameNum(section_, key, 1);
     if (!keyword) return;
@@ -75,6 +89,7 @@ template void KeyExchange::Several(std::string_view key, std::vector<int>& value
 template void KeyExchange::Several(std::string_view key, std::vector<std::string>& values);
 
 void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
+  if (state_) return void(ExchangeState({key}, value));
   int year = value.Year(), month = value.Month(), day = value.Day();
   if (IsReading()) {
     if (!kvfGetListParam(section_, key, 1, "iii", &year, &month, &day)) return;
@@ -88,6 +103,7 @@ void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
 }
 
 void KeyExchange::Count(std::string_view key, CYbSEKvfListBaseInterface& list) {
+  if (state_) return;
   if (IsReading()) {
     list.ReadItemCount(section_, key);
     return;

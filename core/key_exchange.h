@@ -9,6 +9,7 @@
 
 #include "core/file_name.h"
 #include "core/kvf.h"
+#include "core/state_buffer.h"
 #include "platform/dates.h"
 
 namespace tervane {
@@ -38,12 +39,17 @@ class KeyExchange {
   /// Collects the keys with the members' present values as their defaults.
   static KeyExchange Describing(std::vector<KeyInfo>& keys, int docVersion);
 
-  bool IsReading() const { return section_ != nullptr; }
+  /// Keeps the members in memory, and puts them back; for undoing. Item counts are left out: the items themselves are
+  /// kept.
+  static KeyExchange Keeping(StateBuffer& state);
+  static KeyExchange Restoring(StateBuffer& state);
+
+  bool IsReading() const { return section_ != nullptr || isRestoring_; }
   bool IsWriting() const { return file_ != nullptr && !keys_; }
   bool IsDescribing() const { return keys_ != nullptr; }
   /// Version of the document that is read, -1 for a file that holds none; only to be asked in reading.
   int DocVersion() const { return docVersion_; }
-  /// The section in reading, null otherwise.
+  /// The section in reading a file, null otherwise.
   KvfNode* Section() const { return section_; }
 
   template <class Value>
@@ -107,11 +113,20 @@ class KeyExchange {
   /// True when a value was read.
   template <class Value>
   bool Exchange(const Rule& rule, Value& value) {
+    if (state_) return ExchangeState(rule, value);
     if (IsReading()) return Reads(rule) && Read(rule.key, value);
     if (IsWriting() && !rule.written) return false;
     Write(rule.key, value);
     if (keys_) Describe(rule, TypeName(value), &value);
     return false;
+  }
+  /// What goes in one direction only is made from other values.
+  template <class Value>
+  bool ExchangeState(const Rule& rule, Value& value) {
+    if (!rule.written || rule.since == KeyInfo::kNoLimit) return false;
+    if (!isRestoring_) return state_->Put(value), false;
+    state_->Take(value);
+    return true;
   }
   /// Whether the rule reads its key in this document; a key that is skipped is marked as known.
   bool Reads(const Rule& rule);
@@ -141,6 +156,8 @@ class KeyExchange {
   KvfNode* section_ = nullptr;
   KvfFile* file_ = nullptr;
   std::vector<KeyInfo>* keys_ = nullptr;
+  StateBuffer* state_ = nullptr;
+  bool isRestoring_ = false;
   std::shared_ptr<KvfFile> scratch_;  ///< Takes the values that are described.
   int docVersion_ = -1;
 };

@@ -24,15 +24,15 @@ CYbSEKvfBase::~CYbSEKvfBase() {
 
 // ---- Tree
 
-void CYbSEKvfBase::AddChild(std::unique_ptr<CYbSEKvfBase> child) {
+void CYbSEKvfBase::AddChild(std::shared_ptr<CYbSEKvfBase> child) {
   const auto place = children_.begin() + static_cast<std::ptrdiff_t>(plainChildren_++);
   children_.insert(place, std::move(child));
 }
 
-std::unique_ptr<CYbSEKvfBase> CYbSEKvfBase::RemoveChild(CYbSEKvfBase* child) {
+std::shared_ptr<CYbSEKvfBase> CYbSEKvfBase::RemoveChild(CYbSEKvfBase* child) {
   const std::ptrdiff_t place = PlaceOf(child);
   if (place < 0) return nullptr;
-  std::unique_ptr<CYbSEKvfBase> removed = std::move(children_[static_cast<std::size_t>(place)]);
+  std::shared_ptr<CYbSEKvfBase> removed = std::move(children_[static_cast<std::size_t>(place)]);
   children_.erase(children_.begin() + place);
   if (static_cast<std::size_t>(place) < plainChildren_) --plainChildren_;
   return removed;

@@ -58,10 +58,10 @@ class CYbSEKvfBase {
     AddChild(std::move(node));
     return child;
   }
-  void AddChild(std::unique_ptr<CYbSEKvfBase> child);
+  void AddChild(std::shared_ptr<CYbSEKvfBase> child);
   /// Takes a child (also a list's item) out of the walk; it stays alive with the caller, who must not keep it longer
   /// than the tree, and registered. Null when the node is no child.
-  std::unique_ptr<CYbSEKvfBase> RemoveChild(CYbSEKvfBase* child);
+  std::shared_ptr<CYbSEKvfBase> RemoveChild(CYbSEKvfBase* child);
   void SwapChilds(CYbSEKvfBase* a, CYbSEKvfBase* b);
 
   /// The first child of that class, or null.
@@ -83,7 +83,7 @@ class CYbSEKvfBase {
   virtual int GetNumberWhatIs(const CYbSEKvfBase* child) const;
 
   /// A second list of nodes, loaded and saved in front of the children.
-  void AddProperty(std::unique_ptr<CYbSEKvfBase> property) { properties_.push_back(std::move(property)); }
+  void AddProperty(std::shared_ptr<CYbSEKvfBase> property) { properties_.push_back(std::move(property)); }
   CYbSEKvfBase* GetProperty(int number) const;
   int GetPropertyCount() const { return static_cast<int>(properties_.size()); }
 
@@ -171,6 +171,8 @@ class CYbSEKvfBase {
  protected:
   /// The keys of the node in the order of the file.
   virtual void ExchangeKeys(KeyExchange& /*keys*/) {}
+  /// All that a change may change: the keys, and behind them what the node holds beside the file.
+  virtual void ExchangeState(KeyExchange& keys) { ExchangeKeys(keys); }
 
   void AddError(std::string text, std::string key = {}, std::string detail = {});
   void AddWarning(std::string text, std::string key = {}, std::string detail = {});
@@ -185,7 +187,7 @@ class CYbSEKvfBase {
   CYbSEKvfBase* ImportantNode(std::string_view name) const;
 
   // For lists, whose items stand behind the plain children.
-  std::vector<std::unique_ptr<CYbSEKvfBase>> children_;
+  std::vector<std::shared_ptr<CYbSEKvfBase>> children_;
   std::size_t plainChildren_ = 0;
   /// Place of a child in `children_`, or -1.
   std::ptrdiff_t PlaceOf(const CYbSEKvfBase* child) const;
@@ -193,6 +195,7 @@ class CYbSEKvfBase {
 
  private:
   friend class CYbSEKvfGlobalBase;
+  friend class UndoStack;
 
   CYbSEKvfBase* parent_;
   CYbSEKvfGlobalBase* root_;
@@ -206,7 +209,7 @@ class CYbSEKvfBase {
   bool missedSection_ = false;  ///< The latest load looked for the section and did not find it.
   bool isImportant_ = false;    ///< Registered at the root at least once.
   std::vector<Finding> findings_;
-  std::vector<std::unique_ptr<CYbSEKvfBase>> properties_;
+  std::vector<std::shared_ptr<CYbSEKvfBase>> properties_;
   std::string sectionName_, title_, abbreviatedTitle_, helpFile_, helpPage_;
   const PageClass* setupPage_ = nullptr;
 };
@@ -294,6 +297,12 @@ class CTvnKvfGlobalBase : public CYbSEKvfGlobalBase {
   const DataArea& GetDefaultDataArea() const { return defaultArea_; }
   /// Sets `undefined` to whether the default area is undefined.
   void IsUndefined(int& undefined) const { undefined = defaultArea_.IsUndefined(); }
+
+ protected:
+  void ExchangeState(KeyExchange& keys) override {
+    for (DataArea* area : {&maxArea_, &defaultArea_})
+      for (double* value : {&area->x0, &area->y0, &area->x1, &area->y1}) keys("area", *value);
+  }
 
  private:
   DataArea maxArea_, defaultArea_;

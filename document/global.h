@@ -23,7 +23,7 @@ class CGlobal : public CTvnKvfGlobalBase {
 
  private:
   /// Alive and registered, but no part of the walk any more: read from old files, never written.
-  std::vector<std::unique_ptr<CYbSEKvfBase>> retired_;
+  std::vector<std::shared_ptr<CYbSEKvfBase>> retired_;
 };
 
 }  // namespace tervane

@@ -20,6 +20,10 @@ class CExecuteEngineFlagsKvf : public CTvnKvfBase {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+  void ExchangeState(KeyExchange& keys) override {
+    CTvnKvfBase::ExchangeState(keys);
+    keys("own water quality flag", WQ);
+  }
 };
 
 }  // namespace tervane

@@ -36,6 +36,16 @@ void CExtraParamsItemKvf::ExchangeKeys(KeyExchange& keys) {
     exchangeValue(Type);
 }
 
+void CExtraParamsItemKvf::ExchangeState(KeyExchange& keys) {
+  keys("Name", Name);
+  keys("Type", Type);
+  keys("float", FloatValue);
+  keys("integer", IntegerValue);
+  keys("bool", BoolValue);
+  keys("text", TextValue);
+  keys("file name", FilenameValue);
+}
+
 int CExtraParamsKvf::GetSectionUsed() const {
   const auto* basics = Important<CBasicParaKvf>("BASICPARAMETERS");
   return basics ? basics->UsesExtraParams : 1;

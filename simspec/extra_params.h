@@ -27,6 +27,7 @@ class CExtraParamsItemKvf : public CTvnKvfBase {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+  void ExchangeState(KeyExchange& keys) override;
 };
 
 /// The free list of extra parameters for the engine.

@@ -118,6 +118,15 @@ void CModModelCompKvf::ExchangeKeys(KeyExchange& keys) {
   keys("ET", ET);
 }
 
+void CModModelCompKvf::ExchangeState(KeyExchange& keys) {
+  CTvnKvfBase::ExchangeState(keys);
+  keys("own recharge type", Recharge_ModelType);
+  keys("own subsurface type", subsurfaceModelType_);
+  keys("cell rewetting", WithCellRewetting);
+  keys("air flow", WithAirFlow);
+  keys("variably saturated", VariablySaturated);
+}
+
 // ---- CModelCompWQKvf
 
 namespace {

@@ -72,6 +72,7 @@ class CModModelCompKvf : public CTvnKvfBase {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+  void ExchangeState(KeyExchange& keys) override;
 
  private:
   void TakeSubsurfaceModelType(int type);

@@ -34,6 +34,13 @@ void CSimPeriodKvf::ExchangeKeys(KeyExchange& keys) {
   keys("SIMEND", SIMEND);
 }
 
+void CSimPeriodKvf::ExchangeState(KeyExchange& keys) {
+  CTvnKvfBase::ExchangeState(keys);
+  keys("own start", SIMSTART);
+  keys("text of the hot start date", HotStartDate);
+  keys.Several("hot start dates", HotStartDates);
+}
+
 namespace {
 
 /// The dates at which a catalogue holds a stored state, or nothing when it holds none.

@@ -39,6 +39,7 @@ class CSimPeriodKvf : public CTvnKvfBase {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+  void ExchangeState(KeyExchange& keys) override;
 };
 
 /// The dates of a simulation that runs on flow results: water quality or particle tracking.

@@ -234,7 +234,7 @@ TEST(Node, ARemovedChildLivesOnRegisteredButIsNotSaved) {
 TEST(Node, ImportantNodesMayDieWithTheRootAsPropertiesOrRemoved) {
   // They die before and after the root's table of names, which they leave as they die.
   struct Keeper : Root {
-    std::unique_ptr<CYbSEKvfBase> retired;
+    std::shared_ptr<CYbSEKvfBase> retired;
   } root;
   auto* node = root.NewChild<ValueNode>("Node");
   root.RegisterImportantNode(node, "NODE");

@@ -1,0 +1,207 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "core/undo.h"
+
+#include <gmock/gmock.h>
+
+#include "core/dependent_list.h"
+#include "simspec/basic_parameters.h"
+#include "simspec/extra_params.h"
+#include "simspec/model_components.h"
+#include "simspec/periods.h"
+#include "simspec/titles.h"
+#include "tests/support/page_driver.h"
+#include "tests/support/setup.h"
+
+namespace tervane {
+namespace {
+
+using test::PageDriver;
+using test::SavedText;
+using test::SetupText;
+using test::ValueOf;
+
+/// A setup of which a page was opened and a value typed, with undo.
+class UndoOfASetup : public testing::Test {
+ protected:
+  UndoOfASetup() {
+    document.OpenText(SetupText(14,
+                                "section ExtraParams {\nNoOfParams = 3\nsection ExtraParam_1 {\nName = \"a\"\n}\n"
+                                "section ExtraParam_2 {\nName = \"b\"\n}\nsection ExtraParam_3 {\nName = \"c\"\n}\n}"),
+                      "/data/a.tvd");
+    undo.Reset();
+  }
+
+  CFlowModelDoc document;
+  UndoStack undo{document.Root()};
+};
+
+TEST_F(UndoOfASetup, EveryKindOfChangeIsUndoneAndRedone) {
+  auto& list = *document.Root().Child<CExtraParamsKvf>();
+  auto& period = *document.Root().Important<CSimPeriodKvf>("SIMPERIOD");
+  auto& components = *document.Root().Important<CModModelCompKvf>("MODMODELCOMP");
+  document.Root().Important<CBasicParaKvf>("BASICPARAMETERS")->ModelType = 1;
+  undo.Reset();
+  const std::pair<const char*, std::function<void()>> changes[] = {
+      {"type a title", [&] { PageDriver(document, "SimSpec/SimTitle").Enter("Simulation Title:", "Karup"); }},
+      {"delete an item", [&] { list.DeleteItem(2, 1); }},
+      {"insert an item", [&] { list.InsertItem(1, 1); }},
+      {"move an item", [&] { list.MoveItemDown(1, 1); }},
+      {"change the type of a value", [&] { list.GetItem(1)->Type = CExtraParamsItemKvf::kText; }},
+      {"empty the list", [&] { list.SetItemCount(0, 1); }},
+      {"change what the file does not hold",
+       [&] {
+         period.HotStart = period.SimStartFromHotStartDate = 1;
+         period.HotStartDate = "2000/01/05 00:00";
+       }},
+      {"choose another kind of flow", [&] { components.ChooseVariablySaturated(1); }},
+      {"change the area of the maps",
+       [&] {
+         document.Global().SetDefaultDataArea({1, 2, 3, 4});
+       }},
+  };
+  std::vector<std::string> texts{SavedText(document)};
+  for (const auto& [name, change] : changes) {
+    change();
+    EXPECT_TRUE(undo.Commit(name));
+    EXPECT_EQ(undo.UndoName(), name);
+    texts.push_back(SavedText(document));
+    EXPECT_NE(texts.back(), texts[texts.size() - 2]) << name;
+  }
+  for (int round = 0; round < 2; ++round) {
+    for (std::size_t step = std::size(changes); step-- > 0;) {
+      EXPECT_EQ(undo.UndoName(), changes[step].first);
+      ASSERT_TRUE(undo.Undo());
+      EXPECT_EQ(SavedText(document), texts[step]) << changes[step].first;
+    }
+    EXPECT_FALSE(undo.Undo());
+    for (std::size_t step = 0; step < std::size(changes); ++step) {
+      EXPECT_EQ(undo.RedoName(), changes[step].first);
+      ASSERT_TRUE(undo.Redo());
+      EXPECT_EQ(SavedText(document), texts[step + 1]) << changes[step].first;
+    }
+    EXPECT_FALSE(undo.Redo());
+  }
+  // A new change ends what could be redone.
+  undo.Undo();
+  list.AddItem();
+  EXPECT_TRUE(undo.Commit("another"));
+  EXPECT_FALSE(undo.CanRedo());
+}
+
+TEST_F(UndoOfASetup, NothingChangedIsNoStepAndOneControlWithinASecondIsOne) {
+  EXPECT_FALSE(undo.Commit("nothing"));
+  const UndoStack::Time start{};
+  int control = 0, other = 0;
+  auto& title = *document.Root().GetImportantNode("BASICPARAMETERS")->Child<CSimTitleKvf>();
+  const auto type = [&](const char* text, const void* source, int milliseconds) {
+    title.Title = text;
+    EXPECT_TRUE(undo.Commit("Change Title", source, start + std::chrono::milliseconds(milliseconds)));
+  };
+  type("K", &control, 0);
+  type("Ka", &control, 500);
+  type("Kar", &control, 1400);
+  type("Karu", &control, 2500);  // later than a second after the last
+  type("Karup", &other, 2600);
+  const char* expected[] = {"Karu", "Kar", ""};
+  for (const char* text : expected) {
+    undo.Undo();
+    EXPECT_EQ(title.Title, text);
+  }
+  EXPECT_FALSE(undo.CanUndo());
+}
+
+TEST_F(UndoOfASetup, KnowsWhetherTheTreeIsAsItWasSaved) {
+  auto& basics = *document.Root().Important<CBasicParaKvf>("BASICPARAMETERS");
+  const auto change = [&](int engine) {
+    basics.ModelType = engine;
+    undo.Commit("Change Engine");
+  };
+  EXPECT_TRUE(undo.IsSaved());
+  change(1);
+  EXPECT_FALSE(undo.IsSaved());
+  undo.MarkSaved();
+  change(2);
+  undo.Undo();
+  EXPECT_TRUE(undo.IsSaved());
+  undo.Undo();
+  EXPECT_FALSE(undo.IsSaved());
+  change(3);  // the saved state cannot be reached any more
+  undo.Undo();
+  EXPECT_FALSE(undo.IsSaved());
+}
+
+// ---- Links
+
+class Master;
+
+class Species : public CYbSEKvfGroupBase, public CSpeciesItemBase {
+ public:
+  explicit Species(CYbSEKvfBase* parent) : CYbSEKvfGroupBase("", "Species_%d", parent) {}
+  const std::string& GetName() const override { return GetTitle(); }
+  void SetName(const std::string& name) override {
+    SetTitle(name);
+    RenameLinked(name);
+  }
+};
+
+class Master : public CTvnMasterList<Species, CSpeciesListBase> {
+ public:
+  explicit Master(CYbSEKvfBase* parent) : CTvnMasterList("", "Species", "Species_", parent) {
+    GetRoot()->RegisterImportantNode(this, "SPECIES_LIST");
+  }
+};
+
+class Entry : public CYbSEKvfGroupBase, public CSpeciesItemBase {
+ public:
+  Entry(const std::string& name, CYbSEKvfBase* parent) : CYbSEKvfGroupBase(name, "Entry_%d", parent) {}
+  const std::string& GetName() const override { return GetTitle(); }
+  void SetName(const std::string& name) override { SetTitle(name); }
+};
+
+class Dependent : public CTvnDependentList<CYbSEKvfGroupBase, Entry, CSpeciesListBase> {
+ public:
+  explicit Dependent(CYbSEKvfBase* parent) : CTvnDependentList("", "Dependent", "SPECIES_LIST", parent) {
+    FollowMaster();
+  }
+  std::string Names() const {
+    std::string names;
+    for (int number = 1; number <= GetChildCount(); ++number) names += GetChild(number)->GetTitle() + " ";
+    return names;
+  }
+};
+
+TEST(Undo, WhatWasDeletedComesBackWithItsLinksInEveryDependent) {
+  CYbSEKvfGlobalBase root("T");
+  auto* master = root.NewChild<Master>();
+  auto* first = root.NewChild<Dependent>();
+  auto* second = root.NewChild<Dependent>();
+  for (const char* name : {"N", "P", "K"}) master->AddItem()->SetName(name);
+  UndoStack undo(root);
+  master->DeleteItem(2, 1);
+  ASSERT_TRUE(undo.Commit("Delete Species"));
+  master->MoveItemUp(2, 1);
+  ASSERT_TRUE(undo.Commit("Move Species"));
+  EXPECT_EQ(first->Names(), "K N ");
+  undo.Undo();
+  undo.Undo();
+  EXPECT_EQ(first->Names(), "N P K ");
+  EXPECT_EQ(second->Names(), "N P K ");
+  // The links are the old ones: a new name arrives, and a further deletion takes the entries along.
+  master->GetItem(2)->SetName("phosphorus");
+  EXPECT_EQ(second->Names(), "N phosphorus K ");
+  master->DeleteItem(2, 1);
+  EXPECT_EQ(first->Names(), "N K ");
+  undo.Commit("again");
+  undo.Undo();
+  EXPECT_EQ(first->Names(), "N P K ");
+  // An addition that is undone leaves no links behind.
+  master->AddItem()->SetName("Cl");
+  undo.Commit("Add Species");
+  undo.Undo();
+  EXPECT_EQ(first->Names(), "N P K ");
+  for (int number = 1; number <= 3; ++number) EXPECT_EQ(master->GetItem(number)->LinkedItems().size(), 2u);
+}
+
+}  // namespace
+}  // namespace tervane
