@@ -9,11 +9,13 @@
 
 #include "core/kvf_writer.h"
 #include "tests/core/parsed.h"
+#include "tests/support/sides.h"
 
 namespace tervane {
 namespace {
 
 using test::Parsed;
+using test::Sides;
 using testing::HasSubstr;
 using testing::StartsWith;
 
@@ -29,28 +31,28 @@ std::string WithValues(std::string_view values) { return "target T {\nk = " + st
 TEST(KvfParser, AValueHasItsTypeByItsForm) {
   struct Case {
     KvfType type;
-    std::vector<std::string> forms;  // behind `=>` as it is written
+    std::vector<const char*> forms;  // Behind `=>` as it is written.
   };
   const Case cases[] = {
-      {KvfType::Int, {"12", "-12", "-0=>0", "007=>7", "2147483647", "-2147483648"}},
+      {KvfType::Int, {"12", "-12", "-0 => 0", "007 => 7", "2147483647", "-2147483648"}},
       {KvfType::Double,
-       {"2.0", "2.=>2.0", ".5=>0.5", "-.5e1=>-5.0", "1e9", "1E+5=>100000.0", "1.e-05=>1e-5", "-0.0", "0e9999=>0.0",
-        "5e-324", "9007199254740993.0=>9007199254740992.0", "1.7976931348623157e308", "inf", "-inf", "nan",
-        "-nan=>nan"}},
+       {"2.0", "2. => 2.0", ".5 => 0.5", "-.5e1 => -5.0", "1e9", "1E+5 => 100000.0", "1.e-05 => 1e-5", "-0.0",
+        "0e9999 => 0.0", "5e-324", "9007199254740993.0 => 9007199254740992.0", "1.7976931348623157e308", "inf", "-inf",
+        "nan", "-nan => nan"}},
       {KvfType::Float, {"6f", "6.25f", "-1e-35f", "-0f", "1e-45f", "3.4028235e38f", "inff", "-inff", "nanf"}},
       {KvfType::Bool, {"true", "false"}},
-      {KvfType::String, {R"("")", R"("a # { } = , 'b'")"}},
-      {KvfType::Filename, {R"(file "")", "file\t\"x\"=>file \"x\"", R"(file"C:\\x"=>file "C:\\x")"}},
+      {KvfType::String, {R"("")", R"("a # { } = , 'b'")", R"("a \"b\"\\ \n\r\t\u{1}\u{7f} ä€")"}},
+      {KvfType::Filename, {R"(file "")", "file\t\"x\" => file \"x\"", R"(file"C:\\x" => file "C:\\x")"}},
   };
   for (const Case& c : cases) {
-    for (const std::string& form : c.forms) {
-      const std::size_t arrow = form.find("=>");
-      const Parsed parsed(WithValues(form.substr(0, arrow)));
+    for (const char* form : c.forms) {
+      const auto [source, written] = Sides(form);
+      const Parsed parsed(WithValues(source));
       ASSERT_EQ(parsed.Message(), "") << form;
       const KvfParam* param = kvfParamByNum(kvfKeywordByNum(parsed.Target(), 1), 1);
       ASSERT_TRUE(param) << form;
       EXPECT_EQ(param->type, c.type) << form;
-      EXPECT_EQ(KvfValueText(*param), arrow == std::string::npos ? form : form.substr(arrow + 2));
+      EXPECT_EQ(KvfValueText(*param), written.empty() ? source : written);
     }
   }
 }
@@ -94,6 +96,8 @@ TEST(KvfParser, TheLayoutIsFree) {
       {"target \" T T \" {\n\"  k \" = 1\nsection \"ä\\\"\" {}\n}",
        "target \" T T \" {\n  \"  k \" = 1\n  section \"ä\\\"\" {\n  }\n}\n"},
       {"target T {\n\"\\tk\" = 1\n}", "target T {\n  \"\\tk\" = 1\n}\n"},
+      {"target T {\n\"%x\" = 1\n\"1x\" = 1\n\"a b\" = 1\n}",
+       "target T {\n  \"%x\" = 1\n  \"1x\" = 1\n  \"a b\" = 1\n}\n"},
   };
   for (const auto& [source, written] : cases) {
     const Parsed parsed(source);

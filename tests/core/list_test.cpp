@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "core/list.h"
 
+#include <random>
+
 #include <gmock/gmock.h>
 
 #include "tests/core/node_tree.h"
@@ -11,7 +13,7 @@ namespace {
 
 using test::LoadText;
 using test::Root;
-using test::SavedLines;
+using test::Saved;
 using test::SectionNames;
 using test::ValueNode;
 using testing::ElementsAre;
@@ -57,48 +59,33 @@ class ItemsOfTable : public Items {
 };
 using Table = CYbSEKvfListBase<ItemsOfTable>;
 
-/// Works in the section of its list.
-class SectionlessItem : public ValueNode {
+/// Its items work in the section of the list.
+class SectionlessItems : public CYbSEKvfListBase<CTvnKvfBase> {
  public:
-  explicit SectionlessItem(CYbSEKvfBase* parent) : ValueNode("", parent) { NewChild<ValueNode>("Below"); }
+  explicit SectionlessItems(CYbSEKvfBase* parent) : CYbSEKvfListBase("List", "List", parent) {}
+  std::unique_ptr<CTvnKvfBase> NewItem() override { return std::make_unique<CTvnKvfBase>("", "", this); }
 };
 
 void ResizeTo(Items& list, int count) { list.SetItemCount(count, 1); }
 
 // ---- File
 
-TEST(List, TheSavedCountIsThatOfTheNumberedItemSections) {
-  Root root;
-  auto* list = root.NewChild<Items>();
-  list->HasOwnCount = 1;
-  list->NewChild<ValueNode>("Plain");
-  ResizeTo(*list, 3);
-  list->MoveItemUp(3, 1);
-  EXPECT_THAT(SavedLines(root), ElementsAre("section Items {", "Touched = 0", "YbSEKvfListItemCount = 3",
-                                            "NoOfItems = 3", "section Plain {", "Touched = 0", "Value = 7", "}",  //
-                                            "section Item_1 {", "Touched = 0", "Value = 1", "}",                  //
-                                            "section Item_2 {", "Touched = 0", "Value = 3", "}",                  //
-                                            "section Item_3 {", "Touched = 0", "Value = 2", "}", "}"));
-}
-
 TEST(List, TheCountOfAFileDecidesAndItsFaultsLeaveNotes) {
   struct Case {
     const char* content;
     std::vector<int> values;
-    const char* note;  ///< Part of the only one; empty for none.
+    const char* note = nullptr;  ///< Part of the only one.
   };
   const char* missing = "Items:YbSEKvfListItemCount: 3 of 5 items have no section: they are at their defaults";
   for (const Case& c :
-       {Case{"YbSEKvfListItemCount = 2\n section Item_1 { Value = 11 } section Item_2 { Value = 12 }", {11, 12}, ""},
-        {"section Item_1 { Value = 11 } section Item_3 { Value = 13 }", {11, 2}, "1 of 2 items"},  // As it was made.
-        {"YbSEKvfListItemCount = 5\n section Item_2 { Value = 12 } section Item_4 { Value = 14 }",
-         {1, 12, 3, 14, 5},
-         missing},
-        {"YbSEKvfListItemCount = 0\n section Item_1 { Value = 11 }", {}, ""},
+       {Case{"YbSEKvfListItemCount = 2; section Item_1 { Value = 11; } section Item_2 { Value = 12; }", {11, 12}},
+        {"section Item_1 { Value = 11; } section Item_3 { Value = 13; }", {11, 2}, "1 of 2 items"},  // As it was made.
+        {"YbSEKvfListItemCount = 5; section Item_2 { Value = 12; } section Item_4 {}", {1, 12, 3, 4, 5}, missing},
+        {"YbSEKvfListItemCount = 0; section Item_1 {}", {}},
         {"YbSEKvfListItemCount = -1", {}, "Items:YbSEKvfListItemCount: a count of -1 reads as 0"},
-        {"YbSEKvfListItemCount = \"3\"\n section Item_1 {} section Item_2 {}", {1, 2}, "\"3\" stands where"},
-        {"YbSEKvfListItemCount = 3\n NoOfItems = 1\n section Item_1 { Value = 11 }", {11}, ""},  // The later wins.
-        {"NoOfItems = 1\n section Item_1 { Value = 11 }", {11}, ""},
+        {"YbSEKvfListItemCount = \"3\"; section Item_1 {} section Item_2 {}", {1, 2}, "\"3\" stands where"},
+        {"YbSEKvfListItemCount = 3; NoOfItems = 1; section Item_1 { Value = 11; }", {11}},  // The later wins.
+        {"NoOfItems = 1; section Item_1 { Value = 11; }", {11}},
         {"NoOfItems = -9", {}, "Items:NoOfItems: a count of -9 reads as 0"}}) {
     Root root;
     auto* list = root.NewChild<Items>();
@@ -106,85 +93,83 @@ TEST(List, TheCountOfAFileDecidesAndItsFaultsLeaveNotes) {
     ResizeTo(*list, 2);
     const auto notes = LoadText(root, std::string("section Items { ") + c.content + " }");
     EXPECT_EQ(list->Values(), c.values) << c.content;
-    if (*c.note)
-      EXPECT_THAT(notes, ElementsAre(HasSubstr(c.note))) << c.content;
-    else
-      EXPECT_THAT(notes, IsEmpty()) << c.content;
+    EXPECT_EQ(notes.size(), c.note ? 1U : 0U) << c.content;
+    EXPECT_THAT(notes, testing::Each(HasSubstr(c.note ? c.note : ""))) << c.content;
   }
 }
 
-TEST(List, AnEnormousCountIsCutToAMillion) {
-  class Light : public CYbSEKvfListBase<CTvnKvfBase> {
-   public:
-    explicit Light(CYbSEKvfBase* parent) : CYbSEKvfListBase("Light", "Light", parent) {}
-    std::unique_ptr<CTvnKvfBase> NewItem() override { return std::make_unique<CTvnKvfBase>("", "", this); }
-  };
+TEST(List, AnEnormousCountIsCutToAMillionAndItemsWithoutASectionAreNotMissing) {
   Root root;
-  auto* list = root.NewChild<Light>();
-  EXPECT_THAT(LoadText(root, "section Light { Touched = 1\n YbSEKvfListItemCount = 2147483647 }"),
-              ElementsAre("Light:YbSEKvfListItemCount: a count of 2147483647 is cut to 1000000"));
+  auto* list = root.NewChild<SectionlessItems>();
+  EXPECT_THAT(LoadText(root, "section List { Touched = 1; YbSEKvfListItemCount = 2147483647; }"),
+              ElementsAre("List:YbSEKvfListItemCount: a count of 2147483647 is cut to 1000000"));
   EXPECT_EQ(list->GetItemCount(), 1'000'000);
-}
-
-TEST(List, ItemsThatHaveNoSectionByDesignAreNotMissing) {
-  Root root;
-  auto* list = root.NewChild<CYbSEKvfListBase<SectionlessItem>>("List", "List");
-  EXPECT_THAT(LoadText(root, "section List { YbSEKvfListItemCount = 1\n section Below { Value = 3 } }"), IsEmpty());
-  EXPECT_EQ(static_cast<ValueNode*>(list->GetItem(1)->GetFirstChild())->Value, 3);
 }
 
 // ---- Items
 
-TEST(List, ItemsAreAddedInsertedDeletedAndMoved) {
-  struct Case {
-    const char* what;
-    int count;
-    std::function<bool(Items&)> operation;
-    std::vector<int> values;
-    bool result = true;
-  };
-  const auto done = [](auto operation) { return [operation](Items& list) { return operation(list), true; }; };
-  for (const Case& c : {Case{"grow", 1, done([](Items& l) { l.SetItemCount(3, 1); }), {1, 2, 3}},
-                        {"shrink", 3, done([](Items& l) { l.SetItemCount(1, 1); }), {1}},
-                        {"negative count", 3, done([](Items& l) { l.SetItemCount(-4, 1); }), {}},
-                        {"add to none", 0, [](Items& l) { return l.AddItem() == l.GetItem(1); }, {1}},
-                        {"add", 2, [](Items& l) { return l.AddItem() == l.GetItem(3); }, {1, 2, 3}},
-                        {"delete first", 3, done([](Items& l) { l.DeleteItem(1, 1); }), {2, 3}},
-                        {"delete last", 3, done([](Items& l) { l.DeleteItem(3, 1); }), {1, 2}},
-                        {"delete 0", 2, done([](Items& l) { l.DeleteItem(0, 1); }), {1, 2}},
-                        {"delete behind", 2, done([](Items& l) { l.DeleteItem(3, 1); }), {1, 2}},
-                        {"insert first", 2, done([](Items& l) { l.InsertItem(1, 1); }), {3, 1, 2}},
-                        {"insert last", 2, done([](Items& l) { l.InsertItem(2, 1); }), {1, 3, 2}},
-                        {"insert behind", 2, done([](Items& l) { l.InsertItem(3, 1); }), {1, 2}},
-                        {"insert into none", 0, done([](Items& l) { l.InsertItem(1, 1); }), {}},
-                        {"up", 3, [](Items& l) { return l.MoveItemUp(3, 1); }, {1, 3, 2}},
-                        {"up first", 3, [](Items& l) { return l.MoveItemUp(1, 1); }, {1, 2, 3}, false},
-                        {"up behind", 3, [](Items& l) { return l.MoveItemUp(4, 1); }, {1, 2, 3}, false},
-                        {"up of level 2", 3, [](Items& l) { return l.MoveItemUp(2, 2); }, {1, 2, 3}, false},
-                        {"down", 3, [](Items& l) { return l.MoveItemDown(1, 1); }, {2, 1, 3}},
-                        {"down last", 3, [](Items& l) { return l.MoveItemDown(3, 1); }, {1, 2, 3}, false},
-                        {"down 0", 3, [](Items& l) { return l.MoveItemDown(0, 1); }, {1, 2, 3}, false},
-                        {"down of level 0", 3, [](Items& l) { return l.MoveItemDown(1, 0); }, {1, 2, 3}, false},
-                        {"level 2 without lists", 2, done([](Items& l) { l.SetItemCount(5, 2); }), {1, 2}}}) {
-    Root root;
-    auto* list = root.NewChild<Items>();
-    ResizeTo(*list, c.count);
-    EXPECT_EQ(c.operation(*list), c.result) << c.what;
-    EXPECT_EQ(list->Values(), c.values) << c.what;
+TEST(List, ItemsAreAddedInsertedDeletedMovedAndASyncedListFollows) {
+  Root root;
+  auto* list = root.NewChild<Items>();
+  auto* same = root.NewChild<Items>("Same");
+  list->RegisterSyncedList(same, 1);
+  std::mt19937 random(1);
+  std::vector<int> model;
+  int made = 0;
+  for (int step = 0; step < 3000; ++step) {
+    const int count = static_cast<int>(model.size());
+    const int number = static_cast<int>(random() % (model.size() + 5)) - 2;  // Also out of range.
+    const bool isThere = number >= 1 && number <= count;
+    const auto at = model.begin() + (isThere ? number - 1 : 0);
+    const auto what = random() % 6;
+    if (what == 0) {
+      EXPECT_EQ(list->AddItem()->GetNumberWhatAmI(), count + 1);
+      model.push_back(++made);
+    } else if (what == 1) {
+      list->SetItemCount(number, 1);
+      while (number < static_cast<int>(model.size()) && !model.empty()) model.pop_back();
+      while (number > static_cast<int>(model.size())) model.push_back(++made);
+    } else if (what == 2) {
+      list->InsertItem(number, 1);
+      if (isThere) model.insert(at, ++made);
+    } else if (what == 3) {
+      list->DeleteItem(number, 1);
+      if (isThere) model.erase(at);
+    } else if (what == 4) {
+      EXPECT_EQ(list->MoveItemUp(number, 1), isThere && number > 1);
+      if (isThere && number > 1) std::swap(*at, *(at - 1));
+    } else {
+      EXPECT_EQ(list->MoveItemDown(number, 1), isThere && number < count);
+      if (isThere && number < count) std::swap(*at, *(at + 1));
+    }
+    ASSERT_EQ(list->Values(), model);
+    ASSERT_EQ(same->Values(), list->Values());
+  }
+  ResizeTo(*list, 0);
+  same->AddItem();
+  list->DeleteItem(1, 1);  // What is out of range here may be there.
+  EXPECT_EQ(same->GetItemCount(), 0);
+  list->RegisterSyncedList(same, 1);
+  for (const int count : {1, 2, 4}) {
+    list->UnregisterSyncedList(same);  // One entry.
+    ResizeTo(*list, count);
+    EXPECT_EQ(same->GetItemCount(), 1);
   }
 }
 
 TEST(List, PlainChildrenStandBeforeItemsAndAreNotNumbered) {
   Root root;
   auto* list = root.NewChild<Items>();
+  list->HasOwnCount = 1;
   ResizeTo(*list, 2);
   auto* plain = list->NewChild<ValueNode>("Plain");
   list->NewChild<ValueNode>("Plain too");
-  EXPECT_THAT(SectionNames(*list), ElementsAre("Plain", "Plain too", "Item_1", "Item_2"));
-  EXPECT_EQ(list->GetChildCount(), 2);
+  EXPECT_EQ(Saved(root),
+            "section Items { Touched = 0; YbSEKvfListItemCount = 2; NoOfItems = 2; "
+            "section Plain { Touched = 0; Value = 7; } section \"Plain too\" { Touched = 0; Value = 7; } "
+            "section Item_1 { Touched = 0; Value = 1; } section Item_2 { Touched = 0; Value = 2; } }");
   EXPECT_EQ(list->GetChild(1), list->GetItem(1));
-  EXPECT_EQ(list->GetChild(0), nullptr);
-  EXPECT_EQ(list->GetItem(3), nullptr);
+  EXPECT_FALSE(list->GetChild(0) || list->GetItem(3));
   EXPECT_EQ(list->GetNumberWhatIs(plain), -1);
   EXPECT_EQ(list->GetNumberWhatIs(list), -1);
 
@@ -195,87 +180,50 @@ TEST(List, PlainChildrenStandBeforeItemsAndAreNotNumbered) {
   list->RemoveChild(plain);
   EXPECT_EQ(item->GetNumberWhatAmI(), 1);
   const auto removed = list->RemoveChild(item);
-  EXPECT_EQ(list->GetItemCount(), 1);
   EXPECT_EQ(item->GetNumberWhatAmI(), -1);
   EXPECT_THAT(SectionNames(*list), ElementsAre("Plain too", "Item_1"));
 }
 
-TEST(List, WhatIsAddedToATouchedListIsTouched) {
+TEST(List, WhatIsAddedToATouchedListIsTouchedAndWhatIsReadIsNot) {
   for (const bool inserts : {false, true}) {
     for (const bool touched : {false, true}) {
       Root root;
       auto* list = root.NewChild<Items>();
       LoadText(root, std::string("section Items { Touched = ") + (touched ? "1" : "0") +
-                         "\n YbSEKvfListItemCount = 1\n section Item_1 { Touched = 0 } }");
+                         "; YbSEKvfListItemCount = 2; section Item_1 { Touched = 0; } }");
       auto* plain = list->NewChild<ValueNode>("Plain");
+      ResizeTo(*list, 2);  // Nothing is added.
       EXPECT_EQ(list->GetItem(1)->GetHasBeenTouched(), 0);
-      ResizeTo(*list, 1);
-      EXPECT_EQ(list->GetItem(1)->GetHasBeenTouched(), 0);  // Nothing was added.
+      EXPECT_EQ(list->GetItem(2)->GetHasBeenTouched(), touched);  // Has no section.
       inserts ? list->InsertItem(1, 1) : static_cast<void>(list->AddItem());
-      // The new item, the old one and the plain child.
-      EXPECT_EQ(list->GetItem(1)->GetHasBeenTouched(), touched);
-      EXPECT_EQ(list->GetItem(2)->GetHasBeenTouched(), touched);
-      EXPECT_EQ(plain->GetHasBeenTouched(), touched);
+      for (CYbSEKvfBase* child : {list->GetChild(1), list->GetChild(2), list->GetChild(3), list->GetFirstChild()})
+        EXPECT_EQ(child->GetHasBeenTouched(), touched);
+      EXPECT_EQ(list->GetFirstChild(), plain);
     }
   }
-}
-
-TEST(List, AnItemThatIsReadKeepsTheTouchedFlagOfItsSection) {
-  Root root;
-  auto* list = root.NewChild<Items>();
-  LoadText(root, "section Items { Touched = 1\n YbSEKvfListItemCount = 2\n section Item_1 { Touched = 0 } }");
-  EXPECT_EQ(list->GetItem(1)->GetHasBeenTouched(), 0);
-  EXPECT_EQ(list->GetItem(2)->GetHasBeenTouched(), 1);
 }
 
 TEST(List, AHigherLevelReachesTheItemsThatAreLists) {
   Root root;
   auto* table = root.NewChild<Table>("Table", "Table");
-  table->SetItemCount(2, 1);
-  const auto rows = [&] { return std::vector{table->GetItem(1)->Values(), table->GetItem(2)->Values()}; };
-  table->SetItemCount(3, 2);
-  EXPECT_EQ(rows(), (std::vector<std::vector<int>>{{1, 2, 3}, {1, 2, 3}}));
-  table->GetItem(1)->DeleteItem(1, 1);
-  table->DeleteItem(3, 2);
-  EXPECT_EQ(rows(), (std::vector<std::vector<int>>{{2, 3}, {1, 2}}));
-  table->InsertItem(2, 2);
-  EXPECT_EQ(rows(), (std::vector<std::vector<int>>{{2, 4, 3}, {1, 4, 2}}));
-  EXPECT_FALSE(table->MoveItemUp(2, 2));
-  table->SetItemCount(5, 3);  // The rows' items are no lists.
-  EXPECT_EQ(rows(), (std::vector<std::vector<int>>{{2, 4, 3}, {1, 4, 2}}));
-  EXPECT_EQ(table->GetItemCount(), 2);
-}
-
-TEST(List, ASyncedListFollowsAtItsLevelUntilItIsTakenOut) {
-  Root root;
   auto* list = root.NewChild<Items>();
-  auto* same = root.NewChild<Items>("Same");
-  auto* table = root.NewChild<Table>("Table", "Table");
-  table->SetItemCount(1, 1);
-  Items* row = table->GetItem(1);
-  list->RegisterSyncedList(same, 1);
+  table->SetItemCount(2, 1);
   list->RegisterSyncedList(table, 2);
+  const auto expectRows = [&](const std::vector<int>& first, const std::vector<int>& second) {
+    EXPECT_EQ(table->GetItem(1)->Values(), first);
+    EXPECT_EQ(table->GetItem(2)->Values(), second);
+  };
   ResizeTo(*list, 3);
-  list->MoveItemUp(3, 1);  // Not at level 2.
-  EXPECT_EQ(same->Values(), (std::vector{1, 3, 2}));
-  EXPECT_EQ(row->Values(), (std::vector{1, 2, 3}));
-  list->MoveItemDown(1, 1);
-  list->DeleteItem(2, 1);
-  list->InsertItem(1, 1);
-  EXPECT_EQ(same->Values(), list->Values());
-  EXPECT_EQ(row->Values(), (std::vector{4, 1, 3}));
-  same->AddItem();
-  list->DeleteItem(4, 1);  // What is out of range here may be there.
-  EXPECT_EQ(same->GetItemCount(), 3);
-  list->RegisterSyncedList(same, 1);
-  list->UnregisterSyncedList(same);
-  ResizeTo(*list, 1);
-  EXPECT_EQ(same->GetItemCount(), 1);
-  list->UnregisterSyncedList(same);
-  list->UnregisterSyncedList(same);
-  ResizeTo(*list, 2);
-  EXPECT_EQ(same->GetItemCount(), 1);
-  EXPECT_EQ(row->GetItemCount(), 2);
+  expectRows({1, 2, 3}, {1, 2, 3});
+  table->GetItem(1)->DeleteItem(1, 1);
+  list->DeleteItem(3, 1);
+  expectRows({2, 3}, {1, 2});
+  table->InsertItem(2, 2);
+  EXPECT_FALSE(table->MoveItemUp(2, 2) || table->MoveItemDown(1, 0));
+  EXPECT_TRUE(list->MoveItemUp(2, 1));  // Not at level 2.
+  table->SetItemCount(5, 3);            // The rows' items are no lists.
+  expectRows({2, 4, 3}, {1, 4, 2});
+  EXPECT_EQ(table->GetItemCount(), 2);
 }
 
 TEST(List, ItemDefaultsAreLeftAloneInATouchedListUnlessForced) {
@@ -284,12 +232,9 @@ TEST(List, ItemDefaultsAreLeftAloneInATouchedListUnlessForced) {
     int level, force;
     bool resetsItems, resetsBelow;
   };
-  for (const Case& c : {Case{false, 1, 0, true, false},
-                        {true, 1, 0, false, false},
-                        {true, 1, 1, true, false},
-                        {false, 2, 0, false, true},
-                        {true, 2, 0, false, false},
-                        {false, 3, 1, false, false}}) {
+  const Case cases[] = {{false, 1, 0, true, false}, {true, 1, 0, false, false}, {true, 1, 1, true, false},
+                        {false, 2, 0, false, true}, {true, 2, 0, false, false}, {false, 3, 1, false, false}};
+  for (const Case& c : cases) {
     Root root;
     auto* list = root.NewChild<Items>();
     auto* table = root.NewChild<Table>("Table", "Table");
@@ -305,22 +250,17 @@ TEST(List, ItemDefaultsAreLeftAloneInATouchedListUnlessForced) {
 }
 
 TEST(List, ItemsDieFromTheTail) {
-  class Mourned : public CTvnKvfBase {
-   public:
+  static std::vector<int> log;
+  log.clear();
+  struct Mourned : CTvnKvfBase {
     explicit Mourned(CYbSEKvfBase* parent) : CTvnKvfBase("", "Item_%d", parent) {}
-    ~Mourned() override { Log->push_back(Serial); }
+    ~Mourned() override { log.push_back(Serial); }
     int Serial = 0;
-    std::vector<int>* Log = nullptr;
   };
-  std::vector<int> log;
   {
     Root root;
     auto* list = root.NewChild<CYbSEKvfListBase<Mourned>>("List", "List");
-    for (int serial = 1; serial <= 4; ++serial) {
-      Mourned* item = list->AddItem();
-      item->Serial = serial;
-      item->Log = &log;
-    }
+    for (int serial = 1; serial <= 4; ++serial) list->AddItem()->Serial = serial;
     list->SetItemCount(3, 1);
   }
   EXPECT_THAT(log, ElementsAre(4, 3, 2, 1));

@@ -53,28 +53,27 @@ class ValueNodeOn : public Base {
 using ValueNode = ValueNodeOn<CYbSEKvfBase>;
 using ValueGroup = ValueNodeOn<CYbSEKvfGroupBase>;
 
-/// What the tree would write, without the target's lines and without indentation.
-inline std::vector<std::string> SavedLines(CYbSEKvfGlobalBase& root) {
+/// What the tree would write, without the target's lines, on one line: a `;` ends each key.
+inline std::string Saved(CYbSEKvfGlobalBase& root) {
   KvfFile* file = kvfCreate();
   root.Save(file);
-  std::string text, error;
+  std::string text, error, saved;
   WriteKvfText(*file, text, error);
   kvfClose(&file);
-  std::vector<std::string> lines;
-  for (std::size_t start = 0; start < text.size();) {
-    const std::size_t end = text.find('\n', start);
-    const std::string line = text.substr(start, end - start);
-    lines.push_back(line.substr(line.find_first_not_of(' ')));
-    start = end + 1;
+  for (std::size_t start = text.find('\n') + 1, end; (end = text.find('\n', start)) + 1 < text.size();
+       start = end + 1) {
+    const std::string_view line = Trimmed(std::string_view(text).substr(start, end - start));
+    saved += (saved.empty() ? "" : " ") + std::string(line) + (line.ends_with('{') || line == "}" ? "" : ";");
   }
-  return lines.size() < 2 ? lines : std::vector<std::string>(lines.begin() + 1, lines.end() - 1);
+  return saved;
 }
 
-/// Loads the content of the root's target; gives the notes as "section/section:Key: text".
-/// A section may stand on one line: a line ends before and behind each brace that closes one.
+/// Loads the content of the root's target, written as `Saved` gives it; gives the notes as "section/section:Key: text".
 inline std::vector<std::string> LoadText(CYbSEKvfGlobalBase& root, const std::string& content) {
   KvfFile* file = kvfCreate();
-  file->text = FileContent::Of(Replaced("target " + root.GetTargetName() + " {\n" + content + "}", "}", "\n}\n"));
+  const std::string lines = Replaced(Replaced(content, "}", "\n}\n"), ";", "\n");
+  file->folder = "/data";
+  file->text = FileContent::Of("target " + root.GetTargetName() + " {\n" + lines + "\n}");
   std::vector<std::string> notes;
   if (ParseKvf(*file)) {
     root.Load(&file->top);

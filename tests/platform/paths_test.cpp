@@ -4,145 +4,72 @@
 
 #include <filesystem>
 
+#include <fmt/format.h>
 #include <gmock/gmock.h>
+
+#include "tests/support/sides.h"
 
 namespace tervane {
 namespace {
 
+using test::Sides;
+
 TEST(Paths, RootsOfEverySystemAreAbsolute) {
-  for (const char* path : {"/", "/x", "\\x", "C:\\x", "c:/x", "C:", "C:x", "\\\\server\\share", "//server/share/x"}) {
+  for (const char* path : {"/", "/x", "\\x", "C:\\x", "c:/x", "C:", "C:x", "\\\\server\\share", "//server/share/x"})
     EXPECT_TRUE(IsAbsolutePath(path)) << path;
-  }
-  for (const char* path : {"", "x", "x/y", "x\\y", "..", "./x", "1:/x", ":x", "ä:/x"}) {
+  for (const char* path : {"", "x", "x/y", "x\\y", "..", "./x", "1:/x", ":x", "ä:/x"})
     EXPECT_FALSE(IsAbsolutePath(path)) << path;
-  }
 }
 
-struct PathCase {
-  const char* path;
-  const char* folder;
-  const char* expected;
-};
+using Way = std::string (*)(std::string_view path, std::string_view folder);
+
+/// Expects of each "path => way" the way from the folder to the path.
+void ExpectWays(Way way, const char* folder, std::initializer_list<const char*> rows) {
+  for (const char* row : rows) EXPECT_EQ(way(Sides(row).first, folder), Sides(row).second) << row << " in " << folder;
+}
 
 TEST(Paths, AStoredNameIsResolvedAgainstItsFolder) {
-  const PathCase cases[] = {
-      {"", "/data", ""},
-      {"maps/dem.nds2", "/data", "/data/maps/dem.nds2"},
-      {"maps\\dem.nds2", "/data/", "/data/maps/dem.nds2"},
-      {"./maps//dem.nds2", "/data", "/data/maps/dem.nds2"},
-      {"../a/./b/../x", "/data/setup", "/data/a/x"},
-      {"../../../x", "/data", "/x"},
-      {"..\\x", "C:\\data\\setup", "C:/data/x"},
-      {"..\\..\\..\\x", "C:\\data", "C:/x"},
-      {"../../x", "//server/share/data", "//server/share/x"},
-      {"../../x", "//server/share", "//server/share/x"},
-      {".", "/data", "/data"},
-      {"maps/", "/data", "/data/maps/"},
-      {"maps\\", "/data", "/data/maps/"},
-      {"..", "/data", "/"},
-      {"/x/../y", "/data", "/y"},
-      {"C:\\x\\y", "/data", "C:/x/y"},
-      {"C:x", "/data", "C:x"},
-      {"C:", "/data", "C:"},
-      {"\\\\server\\share\\x", "/data", "//server/share/x"},
-      {"///x", "/data", "/x"},
-      {"\\x", "/data", "/x"},
-      {"x", "", "x"},
-      {"a/..", "", "."},
-      {"../x", "setup", "x"},
-      {"../../x", "setup", "../x"},
-      {"a b/ä.tvd", "/data", "/data/a b/ä.tvd"},
-  };
-  for (const PathCase& c : cases) EXPECT_EQ(ResolvedPath(c.path, c.folder), c.expected) << c.path << " in " << c.folder;
+  ExpectWays(ResolvedPath, "/data",
+             {" => ", "maps/x => /data/maps/x", "./maps//x => /data/maps/x", "../../../x => /x", ". => /data",
+              "maps/ => /data/maps/", "maps\\ => /data/maps/", ".. => /", "/x/../y => /y", "C:\\x\\y => C:/x/y",
+              "C:x => C:x", "C: => C:", "///x => /x", "\\x => /x", "a ä => /data/a ä"});
+  ExpectWays(ResolvedPath, "/data", {"\\\\server\\share\\x => //server/share/x"});
+  ExpectWays(ResolvedPath, "/data/setup/", {"../a/./b/../x => /data/a/x", "maps\\x => /data/setup/maps/x"});
+  ExpectWays(ResolvedPath, "C:\\data\\setup", {"..\\x => C:/data/x", "..\\..\\..\\x => C:/x"});
+  ExpectWays(ResolvedPath, "//server/share/data", {"../../x => //server/share/x"});
+  ExpectWays(ResolvedPath, "//server/share", {"../../x => //server/share/x"});
+  ExpectWays(ResolvedPath, "", {"x => x", "a/.. => ."});
+  ExpectWays(ResolvedPath, "setup", {"../x => x", "../../x => ../x"});
 }
 
 TEST(Paths, ARelativeWayLeadsThroughTheCommonFolder) {
-  const PathCase cases[] = {
-      {"/data/x", "/data", "x"},
-      {"/data/x", "/data/", "x"},
-      {"/data/maps/x", "/data/setup", "../maps/x"},
-      {"/x", "/data/setup", "../../x"},
-      {"/data", "/data", "."},
-      {"/data/maps/", "/data", "maps/"},
-      {"/", "/data", ".."},
-      {"/database/x", "/data", "../database/x"},
-      {"/Data/x", "/data", "../Data/x"},
-      {"C:\\Data\\x", "c:/data", "x"},
-      {"C:\\maps\\x", "C:\\setup", "../maps/x"},
-      {"D:\\x", "C:\\setup", "D:/x"},
-      {"C:\\x", "/setup", "C:/x"},
-      {"C:x", "C:/setup", "C:x"},
-      {"C:x", "C:setup", "C:x"},
-      {"\\\\server\\share\\x", "//SERVER/share/setup", "../x"},
-      {"\\\\server\\other\\x", "\\\\server\\share\\setup", "//server/other/x"},
-      {"/data/C:x", "/data", "./C:x"},
-      {"", "/data", ""},
-  };
-  for (const PathCase& c : cases) EXPECT_EQ(RelativePath(c.path, c.folder), c.expected) << c.path << " in " << c.folder;
-}
-
-TEST(Paths, ARelativeWayLeadsBack) {
-  for (const char* path : {"/data/x", "/a/b/c", "/", "/data/setup", "/data/setup/C:x", "C:/x", "//server/share/x"}) {
-    const std::string folder = "/data/setup";
-    EXPECT_EQ(ResolvedPath(RelativePath(path, folder), folder), path);
-  }
+  ExpectWays(RelativePath, "/data",
+             {"/data/x => x", "/data => .", "/data/maps/ => maps/", "/ => ..", "/data2/x => ../data2/x",
+              "/Data/x => ../Data/x", "/data/C:x => ./C:x", " => "});
+  ExpectWays(RelativePath, "/data/setup/", {"/data/maps/x => ../maps/x", "/x => ../../x", "C:\\x => C:/x"});
+  ExpectWays(RelativePath, "c:/data", {"C:\\Data\\x => x", "C:\\maps\\x => ../maps/x", "D:\\x => D:/x", "C:x => C:x"});
+  ExpectWays(RelativePath, "C:setup", {"C:x => C:x"});
+  ExpectWays(RelativePath, "//SERVER/share/a", {"\\\\server\\share\\x => ../x", "//server/b/x => //server/b/x"});
+  // And back.
+  for (const char* path : {"/data/x", "/a/b/c", "/", "/data/setup", "/data/setup/C:x", "C:/x", "//server/share/x"})
+    EXPECT_EQ(ResolvedPath(RelativePath(path, "/data/setup"), "/data/setup"), path);
 }
 
 TEST(Paths, APickedNameIsRelativeOnlyAtOrBelowTheFolder) {
-  const PathCase cases[] = {
-      {"/data/x", "/data", "x"},
-      {"/data/maps/x", "/data", "maps/x"},
-      {"C:\\Data\\maps\\x", "C:\\data", "maps/x"},
-      {"/data", "/data", "."},
-      {"/other/x", "/data", "/other/x"},
-      {"/database/x", "/data", "/database/x"},
-      {"/x", "/data", "/x"},
-      {"D:\\a\\..\\x", "C:\\data", "D:/x"},
-      {"\\\\server\\share\\x", "/data", "//server/share/x"},
-      {"/data/../x", "/data", "/x"},
-      {"", "/data", ""},
-  };
-  for (const PathCase& c : cases) EXPECT_EQ(StoredPath(c.path, c.folder), c.expected) << c.path << " in " << c.folder;
+  ExpectWays(StoredPath, "/data",
+             {"/data/maps/x => maps/x", "/data => .", "/data2/x => /data2/x", "/data/../x => /x", " => "});
+  ExpectWays(StoredPath, "C:\\data", {"C:\\Data\\maps\\x => maps/x", "D:\\a\\..\\x => D:/x"});
 }
 
 TEST(Paths, APathIsTakenApart) {
-  struct Case {
-    const char* path;
-    const char* folder;
-    const char* name;
-    const char* base;
-    const char* extension;
-  };
-  const Case cases[] = {
-      {"", "", "", "", ""},
-      {"x.tvd", "", "x.tvd", "x", ".tvd"},
-      {"/data/x.tvd", "/data", "x.tvd", "x", ".tvd"},
-      {"data\\x.v10.tvd", "data", "x.v10.tvd", "x.v10", ".tvd"},
-      {"/x", "/", "x", "x", ""},
-      {"//x", "/", "x", "x", ""},
-      {"C:\\x", "C:\\", "x", "x", ""},
-      {"C:x", "C:", "x", "x", ""},
-      {"data.d/x", "data.d", "x", "x", ""},
-      {"data//x", "data", "x", "x", ""},
-      {"data/", "data", "", "", ""},
-      {".hidden", "", ".hidden", ".hidden", ""},
-      {".hidden.tvd", "", ".hidden.tvd", ".hidden", ".tvd"},
-      {"a/..", "a", "..", "..", ""},
-      {"x.", "", "x.", "x", "."},
-  };
-  for (const Case& c : cases) {
-    EXPECT_EQ(FolderOf(c.path), c.folder) << c.path;
-    EXPECT_EQ(FileNameOf(c.path), c.name) << c.path;
-    EXPECT_EQ(BaseNameOf(c.path), c.base) << c.path;
-    EXPECT_EQ(ExtensionOf(c.path), c.extension) << c.path;
+  // Into folder, name, base and extension.
+  for (const char* row : {" => |||", "x.tvd => |x.tvd|x|.tvd", "/a/x.tvd => /a|x.tvd|x|.tvd", "/x => /|x|x|",
+                          "a\\x.v1.tvd => a|x.v1.tvd|x.v1|.tvd", "//x => /|x|x|", "C:\\x => C:\\|x|x|",
+                          "C:x => C:|x|x|", "a.d/x => a.d|x|x|", "a//x => a|x|x|", "a/ => a|||", ".x => |.x|.x|",
+                          ".x.tvd => |.x.tvd|.x|.tvd", "a/.. => a|..|..|", "x. => |x.|x|."}) {
+    const auto [path, parts] = Sides(row);
+    EXPECT_EQ(fmt::format("{}|{}|{}|{}", FolderOf(path), FileNameOf(path), BaseNameOf(path), ExtensionOf(path)), parts);
   }
-}
-
-TEST(Paths, BothSeparatorsCanEndAPath) {
-  EXPECT_TRUE(EndsInSeparator("maps/"));
-  EXPECT_TRUE(EndsInSeparator("maps\\"));
-  EXPECT_FALSE(EndsInSeparator("maps"));
-  EXPECT_FALSE(EndsInSeparator(""));
 }
 
 TEST(Paths, ARelativePathIsMadeAbsoluteFromTheWorkingFolder) {

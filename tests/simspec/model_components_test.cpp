@@ -2,19 +2,23 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "simspec/model_components.h"
 
+#include <array>
 #include <functional>
-#include <set>
 
+#include <fmt/format.h>
 #include <gmock/gmock.h>
 
+#include "platform/text.h"
 #include "simspec/basic_parameters.h"
+#include "simspec/control_parameters.h"
 #include "tests/simspec/test_setup.h"
+#include "tests/support/sides.h"
 
 namespace tervane {
 namespace {
 
+using test::Sides;
 using test::TestSetup;
-using testing::ElementsAre;
 using testing::IsEmpty;
 
 /// The nodes that decide.
@@ -23,124 +27,88 @@ struct Choice {
       : basics(setup.At<CBasicParaKvf>("SimSpec")),
         own(setup.At<CModelCompKvf>("SimSpec/ModelComp")),
         modflow(setup.At<CModModelCompKvf>("SimSpec/ModModelComp")),
-        quality(setup.At<CModelCompWQKvf>("ModelCompWQ")) {}
+        quality(setup.At<CModelCompWQKvf>("ModelCompWQ")),
+        zone(setup.At<CCompControlParaSZKvf>("SimSpec/CompControlParaSZ")) {}
   CBasicParaKvf& basics;
   CModelCompKvf& own;
   CModModelCompKvf& modflow;
   CModelCompWQKvf& quality;
+  CCompControlParaSZKvf& zone;
 };
 
-TEST(ModelComponents, ANewSetupHasTheOwnEngineWithoutRiversAndWaterQuality) {
-  TestSetup setup;
-  EXPECT_EQ(setup.Written("SimSpec:ModelType"), "0");
-  EXPECT_EQ(setup.WrittenKeys("SimSpec/ModelComp"),
-            "ET=1 OL=1 SZ=1 UZ=1 WM=1 River=0 WQ=0 ADPTRadio=0 UZ_ModelType=2 SZ_ModelType=0 OL_ModelType=0 "
-            "UseCurrentWmSimulation=1 FilenameTvdRes=file \"\"");
-  EXPECT_EQ(setup.WrittenKeys("SimSpec/ModModelComp"),
-            "OL=0 River=0 RiverModelType=0 Recharge=0 Recharge_ModelType=0 Subsurface=1 Subsurface_ModelType=1 "
-            "Modflow2000_BCFType=1 ET=0");
-  EXPECT_EQ(setup.WrittenKeys("ModelCompWQ"), "OL=0 River=0 UZ=0 PlantUptake=0 SZ=0 IncludeProcesses=0 ProcessType=0");
-  EXPECT_EQ(setup.WrittenKeys("ModelCompPT"),
-            "InitDensityRadio=1 ParticleMass=100.0 InitLocationRadio=0 DistanceFracFromBottom=0.5 "
-            "AvoidInitParticlesInFixedCells=0 AvoidInitParticlesAboveWaterTable=1 RegistrationZoneRadio=0 "
-            "AutomaticWellRegistration=1");
-  EXPECT_THAT(setup.Report().unread, IsEmpty());
-}
-
 TEST(ModelComponents, TheyDecideWhichNodesTakePart) {
-  // A path goes by its last section; the nodes that always take part are not listed, but checked.
-  const std::string control = "SimSpec/CompControlPara";
-  const std::set<std::string> always = {
-      "FlowModelDocVersion", "ViewSettings",      "CIntroductionKvf",        "Overlays", "SimSpec", "SimSpec/SimTitle",
-      "ExtraParams",         "ModelCompWQ/WQTSC", "SimSpec/SimulationPeriod"};
-  const std::set<std::string> own = {"SimSpec/ModelComp", control + "TimeStep"};
-  const std::string ol = control + "OL", uz = control + "UZ", sz = control + "SZ", modComp = "SimSpec/ModModelComp",
-                    air = "SimSpec/AirFlowSimulationParametersMod", transient = sz + "/CompControlParaSZPCGTrans",
-                    steady = sz + "/CompControlParaSZPCGSteady", overrelaxation = sz + "/CompControlParaSZSOR",
-                    exchange = sz + "/CompControlParaRivEx", colloids = "ModelCompWQ/ColloidControlPara";
-  const std::set<std::string> others = {
-      "ExecuteEngineFlagsKvf", "Overview", "ModelCompWQ", "ModelCompPT", modComp, ol, uz, sz, air, transient, steady,
-      overrelaxation,          exchange,   colloids};
-  const auto join = [](std::set<std::string> to, const std::set<std::string>& more) {
-    to.insert(more.begin(), more.end());
-    return to;
-  };
+  constexpr const char* nodes[] = {"own => SimSpec/ModelComp",
+                                   "step => SimSpec/CompControlParaTimeStep",
+                                   "ol => SimSpec/CompControlParaOL",
+                                   "uz => SimSpec/CompControlParaUZ",
+                                   "sz => SimSpec/CompControlParaSZ",
+                                   "mod => SimSpec/ModModelComp",
+                                   "trans => SimSpec/CompControlParaSZ/CompControlParaSZPCGTrans",
+                                   "WQ => ModelCompWQ",
+                                   "PT => ModelCompPT",
+                                   "steady => SimSpec/CompControlParaSZ/CompControlParaSZPCGSteady",
+                                   "flags => ExecuteEngineFlagsKvf",
+                                   "sor => SimSpec/CompControlParaSZ/CompControlParaSZSOR",
+                                   "air => SimSpec/AirFlowSimulationParametersMod",
+                                   "exchange => SimSpec/CompControlParaSZ/CompControlParaRivEx",
+                                   "colloids => ModelCompWQ/ColloidControlPara",
+                                   "overview => Overview"};
   struct Case {
     const char* what;
     std::function<void(Choice)> choose;
-    std::set<std::string> used;  ///< Beside those that always take part.
+    std::string used;
   };
   const Case cases[] = {
-      {"new", [](Choice) {}, join(own, {ol, uz, sz, transient})},
-      {"without OL", [](Choice c) { c.own.OL = 0; }, join(own, {uz, sz, transient})},
-      {"OL by subcatchment", [](Choice c) { c.own.OL_ModelType = 1; }, join(own, {uz, sz, transient})},
-      {"without UZ", [](Choice c) { c.own.UZ = 0; }, join(own, {ol, sz, transient})},
-      {"without SZ", [](Choice c) { c.own.SZ = 0; }, join(own, {ol, uz, transient})},
-      {"SZ as reservoirs", [](Choice c) { c.own.SZ_ModelType = 1; }, join(own, {ol, uz, transient})},
-      {"without WM", [](Choice c) { c.own.WM = 0; }, join(own, {transient})},
-      {"with river", [](Choice c) { c.own.River = 1; }, join(own, {ol, uz, sz, transient, exchange})},
-      {"WQ", [](Choice c) { c.own.WQ = 1; }, join(own, {ol, uz, sz, transient, "ModelCompWQ"})},
-      {"WQ of UZ alone", [](Choice c) { c.own.WQ = c.own.UZ = 1, c.own.OL = c.own.SZ = 0; },
-       join(own, {uz, transient, "ModelCompWQ"})},
-      {"WQ of nothing", [](Choice c) { c.own.WQ = 1, c.own.OL = c.own.UZ = c.own.SZ = 0; }, join(own, {transient})},
-      {"WQ of OL without WM", [](Choice c) { c.own.WQ = 1, c.own.WM = c.own.UZ = c.own.SZ = 0; },
-       join(own, {transient, "ModelCompWQ"})},
-      {"PT", [](Choice c) { c.own.WQ = c.own.ADPTRadio = 1; }, join(own, {ol, uz, sz, transient, "ModelCompPT"})},
-      {"PT of SZ alone", [](Choice c) { c.own.WQ = c.own.ADPTRadio = 1, c.own.OL = c.own.UZ = 0; },
-       join(own, {sz, transient, "ModelCompPT"})},
-      {"PT of nothing", [](Choice c) { c.own.WQ = c.own.ADPTRadio = 1, c.own.OL = c.own.UZ = c.own.SZ = 0; },
-       join(own, {transient})},
-      {"neither AD nor PT", [](Choice c) { c.own.WQ = 1, c.own.ADPTRadio = 2; }, join(own, {ol, uz, sz, transient})},
+      {"new", [](Choice) {}, "own step ol uz sz trans"},
+      {"without OL", [](Choice c) { c.own.OL = 0; }, "own step uz sz trans"},
+      {"OL by subcatchment", [](Choice c) { c.own.OL_ModelType = 1; }, "own step uz sz trans"},
+      {"without UZ", [](Choice c) { c.own.UZ = 0; }, "own step ol sz trans"},
+      {"without SZ", [](Choice c) { c.own.SZ = 0; }, "own step ol uz trans"},
+      {"SZ as reservoirs", [](Choice c) { c.own.SZ_ModelType = 1; }, "own step ol uz trans"},
+      {"without WM", [](Choice c) { c.own.WM = 0; }, "own step trans"},
+      {"with river", [](Choice c) { c.own.River = 1; }, "own step ol uz sz trans exchange"},
+      {"steady state", [](Choice c) { c.zone.SolverOption = c.own.River = 1; }, "own step ol uz sz steady"},
+      {"overrelaxation", [](Choice c) { c.zone.SolverOption = 2; }, "own step ol uz sz sor"},
+      {"overrelaxation with river", [](Choice c) { c.zone.SolverOption = 2, c.own.River = 1; },
+       "own step ol uz sz sor exchange"},
+      {"unknown solver", [](Choice c) { c.zone.SolverOption = 3; }, "own step ol uz sz"},
+      {"WQ", [](Choice c) { c.own.WQ = 1; }, "own step ol uz sz trans WQ"},
+      {"WQ of UZ", [](Choice c) { c.own.WQ = c.own.UZ = 1, c.own.OL = c.own.SZ = 0; }, "own step uz trans WQ"},
+      {"WQ of nothing", [](Choice c) { c.own.WQ = 1, c.own.OL = c.own.UZ = c.own.SZ = 0; }, "own step trans"},
+      {"WQ of OL", [](Choice c) { c.own.WQ = 1, c.own.WM = c.own.UZ = c.own.SZ = 0; }, "own step trans WQ"},
+      {"PT", [](Choice c) { c.own.WQ = c.own.ADPTRadio = 1; }, "own step ol uz sz trans PT"},
+      {"PT of SZ", [](Choice c) { c.own.WQ = c.own.ADPTRadio = 1, c.own.OL = c.own.UZ = 0; }, "own step sz trans PT"},
+      {"neither AD nor PT", [](Choice c) { c.own.WQ = 1, c.own.ADPTRadio = 2; }, "own step ol uz sz trans"},
       {"colloids", [](Choice c) { c.quality.IncludeProcesses = 1, c.quality.ProcessType = 2; },
-       join(own, {ol, uz, sz, transient, colloids})},
-      {"processes off", [](Choice c) { c.quality.ProcessType = 2; }, join(own, {ol, uz, sz, transient})},
-      {"Kinetra", [](Choice c) { c.quality.IncludeProcesses = c.quality.ProcessType = 1; },
-       join(own, {ol, uz, sz, transient})},
-      {"Surfact", [](Choice c) { c.basics.ModelType = 1; }, {modComp, transient}},
-      {"Surfact with WQ", [](Choice c) { c.basics.ModelType = c.own.WQ = 1; }, {modComp, transient}},
-      {"Surfact with air",
-       [](Choice c) {
-         c.basics.ModelType = 1;
-         c.modflow.WithAirFlow = 1;
-       },
-       {modComp, transient}},
-      {"Modflow 96", [](Choice c) { c.basics.ModelType = 2; }, {transient}},
-      {"Modflow 2000", [](Choice c) { c.basics.ModelType = 3; }, {transient}},
-      {"unknown engine", [](Choice c) { c.basics.ModelType = 4; }, {transient}}};
+       "own step ol uz sz trans colloids"},
+      {"processes off", [](Choice c) { c.quality.ProcessType = 2; }, "own step ol uz sz trans"},
+      {"Kinetra", [](Choice c) { c.quality.IncludeProcesses = c.quality.ProcessType = 1; }, "own step ol uz sz trans"},
+      {"Surfact", [](Choice c) { c.basics.ModelType = 1; }, "mod trans"},
+      {"Surfact with WQ", [](Choice c) { c.basics.ModelType = c.own.WQ = 1; }, "mod trans"},
+      {"Modflow 96", [](Choice c) { c.basics.ModelType = 2; }, "trans"},
+      {"Modflow 2000", [](Choice c) { c.basics.ModelType = 3; }, "trans"},
+      {"unknown engine", [](Choice c) { c.basics.ModelType = 4; }, "trans"}};
   for (const Case& c : cases) {
     TestSetup setup;
     c.choose(Choice(setup));
-    std::set<std::string> used;
-    for (const std::set<std::string>& paths : {always, own, others})
-      for (const std::string& path : paths)
-        if (setup.IsUsed(path)) used.insert(path);
-    EXPECT_EQ(used, join(always, c.used)) << c.what;
-  }
-}
-
-TEST(ModelComponents, TheSolverOfTheSaturatedZoneDecidesWhichOfItsNodesTakePart) {
-  const std::string zone = "SimSpec/CompControlParaSZ/CompControlPara";
-  for (const int river : {0, 1}) {
-    for (int solver = 0; solver <= 3; ++solver) {
-      TestSetup setup("section SimSpec {\nsection ModelComp {\nRiver = " + std::to_string(river) +
-                      "\n}\nsection CompControlParaSZ {\nSolverOption = " + std::to_string(solver) + "\n}\n}");
-      EXPECT_EQ(setup.IsUsed(zone + "SZPCGTrans"), solver == 0);
-      EXPECT_EQ(setup.IsUsed(zone + "SZPCGSteady"), solver == 1);
-      EXPECT_EQ(setup.IsUsed(zone + "SZSOR"), solver == 2);
-      EXPECT_EQ(setup.IsUsed(zone + "RivEx"), solver != 1 && river);
-    }
+    std::string used;
+    for (const char* node : nodes)
+      if (setup.IsUsed(Sides(node).second)) used += (used.empty() ? "" : " ") + Sides(node).first;
+    EXPECT_EQ(used, c.used) << c.what;
+    for (const char* always : {"FlowModelDocVersion", "ViewSettings", "CIntroductionKvf", "Overlays", "SimSpec",
+                               "SimSpec/SimTitle", "ExtraParams", "ModelCompWQ/WQTSC", "SimSpec/SimulationPeriod"})
+      EXPECT_TRUE(setup.IsUsed(always)) << c.what << always;
   }
 }
 
 TEST(ModelComponents, AirFlowTakesPartOnlyWithSurfactInAVariablySaturatedSubsurface) {
   for (int engine = 0; engine <= 4; ++engine) {
-    for (const int subsurface : {0, 1}) {
-      for (int type = 0; type <= 4; ++type) {
-        TestSetup setup("section SimSpec {\nModelType = " + std::to_string(engine) +
-                        "\nsection ModModelComp {\nSubsurface = " + std::to_string(subsurface) +
-                        "\nSubsurface_ModelType = " + std::to_string(type) + "\n}\n}");
-        EXPECT_EQ(setup.IsUsed("SimSpec/AirFlowSimulationParametersMod"), engine == 1 && subsurface && type == 3);
-      }
+    for (const auto& [subsurface, type] : {std::pair{0, 3}, {1, 0}, {1, 1}, {1, 2}, {1, 3}, {1, 4}}) {
+      TestSetup setup(
+          fmt::format("section SimSpec {{\nModelType = {}\nsection ModModelComp {{\nSubsurface = {}\n"
+                      "Subsurface_ModelType = {}\n}}\n}}",
+                      engine, subsurface, type));
+      EXPECT_EQ(setup.IsUsed("SimSpec/AirFlowSimulationParametersMod"), engine == 1 && subsurface && type == 3);
     }
   }
 }
@@ -157,32 +125,23 @@ TEST(ModelComponents, ANodeBelowOneThatTakesNoPartHasItsFlagOffInTheFile) {
 TEST(ModelComponents, TheTypeOfSubsurfaceFlowFollowsEngineAndFlags) {
   struct Case {
     int engine;
-    const char* key;  ///< As read.
-    const char* written;
+    const char *type, *written;
     int rewetting, airFlow, variablySaturated;  ///< After asking.
   };
-  const char* absent = "";
-  for (const Case& c : {Case{1, absent, "1", 1, 0, 0},
-                        {1, "Subsurface_ModelType = 0", "0", 0, 0, 0},
-                        {1, "Subsurface_ModelType = 1", "1", 1, 0, 0},
-                        {1, "Subsurface_ModelType = 2", "2", 1, 0, 1},
-                        {1, "Subsurface_ModelType = 3", "3", 1, 1, 1},
-                        {1, "Subsurface_ModelType = 7", "2", 1, 0, 1},
-                        {1, "Subsurface_ModelType = -1", "1", 1, 0, 0},
-                        {2, absent, "1", 1, 0, 0},
-                        {2, "Subsurface_ModelType = 0", "0", 0, 0, 0},
-                        {2, "Subsurface_ModelType = 3", "1", 1, 1, 1},
-                        {3, "Subsurface_ModelType = 2", "1", 1, 0, 1},
-                        {0, "Subsurface_ModelType = 3", "3", 1, 1, 1},
-                        {0, "Subsurface_ModelType = 9", "9", 1, 0, 1},
-                        {4, "Subsurface_ModelType = -7", "-7", 1, 0, 0}}) {
-    TestSetup setup("section SimSpec {\nModelType = " + std::to_string(c.engine) + "\nsection ModModelComp {\n" +
-                    c.key + "\n}\n}");
-    EXPECT_EQ(setup.Written("SimSpec/ModModelComp:Subsurface_ModelType"), c.written) << c.engine << ' ' << c.key;
+  const Case cases[] = {{1, "", "1", 1, 0, 0},   {1, "0", "0", 0, 0, 0},  {1, "1", "1", 1, 0, 0},
+                        {1, "2", "2", 1, 0, 1},  {1, "3", "3", 1, 1, 1},  {1, "7", "2", 1, 0, 1},
+                        {1, "-1", "1", 1, 0, 0}, {2, "", "1", 1, 0, 0},   {2, "0", "0", 0, 0, 0},
+                        {2, "3", "1", 1, 1, 1},  {3, "2", "1", 1, 0, 1},  {0, "3", "3", 1, 1, 1},
+                        {0, "9", "9", 1, 0, 1},  {4, "-7", "-7", 1, 0, 0}};
+  for (const Case& c : cases) {
+    const std::string key = *c.type ? std::string("Subsurface_ModelType = ") + c.type : "";
+    TestSetup setup("section SimSpec {\nModelType = " + std::to_string(c.engine) + "\nsection ModModelComp {\n" + key +
+                    "\n}\n}");
+    EXPECT_EQ(setup.Written("SimSpec/ModModelComp:Subsurface_ModelType"), c.written) << c.engine << ' ' << key;
     const CModModelCompKvf& node = Choice(setup).modflow;
-    EXPECT_EQ(node.WithCellRewetting, c.rewetting) << c.engine << ' ' << c.key;
-    EXPECT_EQ(node.WithAirFlow, c.airFlow) << c.engine << ' ' << c.key;
-    EXPECT_EQ(node.VariablySaturated, c.variablySaturated) << c.engine << ' ' << c.key;
+    EXPECT_EQ((std::array{node.WithCellRewetting, node.WithAirFlow, node.VariablySaturated}),
+              (std::array{c.rewetting, c.airFlow, c.variablySaturated}))
+        << key;
   }
 
   TestSetup setup("section SimSpec {\nModelType = 1\nsection ModModelComp {\nSubsurface_ModelType = 3\n}\n}");
@@ -213,15 +172,10 @@ TEST(ModelComponents, TheOverviewShowsTheComponentsAndNotTheEngine) {
   EXPECT_EQ(Choice(setup).basics.AddToOverview(lines, 1), 1);
   EXPECT_EQ(setup.Root().AddToOverview(lines, 0), 1);
   EXPECT_THAT(lines, IsEmpty());
-  EXPECT_EQ(Choice(setup).own.AddToOverview(lines, 2), 1);
-  std::vector<std::string> texts;
-  for (const OverviewLine& line : lines) {
-    EXPECT_EQ(line.title, "Simulation specification");
-    EXPECT_EQ(line.level, 2);
-    texts.push_back(line.text);
-  }
-  EXPECT_THAT(texts, ElementsAre("ET = 1", "OL = 1", "SZ = 1", "UZ = 1", "WM = 1", "River = 0", "WQ = 0",
-                                 "UZ_ModelType = 2", "SZ_ModelType = 0", "OL_ModelType = 0"));
+  EXPECT_EQ(Choice(setup).own.AddToOverview(lines, 0), 1);
+  EXPECT_EQ(Replaced(OverviewText(lines), "\r\n      ", "; "),
+            "PAGE: Simulation specification; ET = 1; OL = 1; SZ = 1; UZ = 1; WM = 1; River = 0; WQ = 0; "
+            "UZ_ModelType = 2; SZ_ModelType = 0; OL_ModelType = 0\r\n");
 }
 
 TEST(ModelComponents, WaterQualityOfATwoLayerUnsaturatedZoneIsAnError) {
@@ -229,12 +183,9 @@ TEST(ModelComponents, WaterQualityOfATwoLayerUnsaturatedZoneIsAnError) {
     int wq, uz, uzModelType, qualityUz;
     bool isError;
   };
-  for (const Case& c : {Case{1, 1, 2, 1, true},
-                        {0, 1, 2, 1, false},
-                        {1, 0, 2, 1, false},
-                        {1, 1, 0, 1, false},
-                        {1, 1, 1, 1, false},
-                        {1, 1, 2, 0, false}}) {
+  const Case cases[] = {{1, 1, 2, 1, true},  {0, 1, 2, 1, false}, {1, 0, 2, 1, false},
+                        {1, 1, 0, 1, false}, {1, 1, 1, 1, false}, {1, 1, 2, 0, false}};
+  for (const Case& c : cases) {
     TestSetup setup;
     const Choice choice(setup);
     choice.own.WQ = c.wq;
