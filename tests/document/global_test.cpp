@@ -130,7 +130,7 @@ TEST(Global, ReadsSpeciesBeforeWhatKeepsAListPerSpeciesAndTheSaturatedZoneTwice)
   }
 }
 
-TEST(Global, AFileOfVersion1HoldsTheStoringOfResultsInsideTheSimulationSpecification) {
+TEST(Global, AFileOfVersion1HoldsTheStoringOfResultsInSimSpec) {
   std::vector<std::string> log;
   CFlowModelDoc document;
   CGlobal& root = document.Global();
