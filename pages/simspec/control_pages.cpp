@@ -6,6 +6,7 @@
 
 namespace tervane {
 
+template <>
 void CCompControlParaTimeStepDlg::Describe(PageForm& form) {
   CCompControlParaTimeStepKvf& n = Node();
   const CModelCompKvf& components = ModelCompOf(n);
@@ -25,6 +26,7 @@ void CCompControlParaTimeStepDlg::Describe(PageForm& form) {
   form.Number("Input precipitation rate requiring its own time step", n.PrecThresholdRate).Unit("mm/hr");
 }
 
+template <>
 void CCompControlParaTimeStepWQDlg::Describe(PageForm& form) {
   using Limits = CCompControlParaTimeStepWQKvf::Limits;
   CCompControlParaTimeStepWQKvf& n = Node();
@@ -43,6 +45,7 @@ void CCompControlParaTimeStepWQDlg::Describe(PageForm& form) {
   form.Number("Max. Macropore Courant Number :", n.MaxCourantMP);
 }
 
+template <>
 void CCompControlParaPTDlg::Describe(PageForm& form) {
   CCompControlParaPTKvf& n = Node();
   form.Check("Apply vertical correction when moving between cells with variable thicknesses",
@@ -53,6 +56,7 @@ void CCompControlParaPTDlg::Describe(PageForm& form) {
   form.Number("Max dispersive courant number", n.MaxDispersiveCourantSZ);
 }
 
+template <>
 void CCompControlParaOLDlg::Describe(PageForm& form) {
   CCompControlParaOLKvf& n = Node();
   const CModelCompKvf& components = ModelCompOf(n);
@@ -84,6 +88,7 @@ void CCompControlParaOLDlg::Describe(PageForm& form) {
   });
 }
 
+template <>
 void CCompControlParaUZDlg::Describe(PageForm& form) {
   CCompControlParaUZKvf& n = Node();
   const CModelCompKvf& components = ModelCompOf(n);
@@ -135,6 +140,7 @@ std::shared_ptr<PageForm> RiverExchangeForm(CCompControlParaRivExKvf& n) {
 
 }  // namespace
 
+template <>
 void CCompControlParaSZDlg::Describe(PageForm& form) {
   CCompControlParaSZKvf& n = Node();
   form.Radio("", n.SolverOption,
@@ -151,6 +157,7 @@ void CCompControlParaSZDlg::Describe(PageForm& form) {
                   [&n, &river, solver] { return river.IsDlgUsedInSetup() && n.SolverOption == solver ? 0 : -1; });
 }
 
+template <>
 void CCompControlParaColloidWQDlg::Describe(PageForm& form) {
   CCompControlParaColloidWQKvf& n = Node();
   form.Number("Conversion factor:", n.ConversionFactor).Unit("[g metabolite/ g pesticide]");
@@ -164,6 +171,7 @@ void CCompControlParaColloidWQDlg::Describe(PageForm& form) {
   form.Check("Include sorption of sprayed pesticides:", n.IncludeSorption);
 }
 
+template <>
 void CAirFlowModDlg::Describe(PageForm& form) {
   CAirFlowModKvf& n = Node();
   PageForm& constants = form.Group("Physical constants");

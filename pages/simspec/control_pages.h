@@ -9,70 +9,40 @@
 
 namespace tervane {
 
-// Plain value pages: all that they do is in their description.
-
-class CCompControlParaTimeStepDlg : public PageOf<CCompControlParaTimeStepKvf> {
+/// A plain value page: all that it does is in its description, of which each node class has one.
+template <class Node>
+class ValuePage : public PageOf<Node> {
  public:
-  using PageOf::PageOf;
+  using PageOf<Node>::PageOf;
 
  protected:
   void Describe(PageForm& form) override;
 };
 
-class CCompControlParaTimeStepWQDlg : public PageOf<CCompControlParaTimeStepWQKvf> {
- public:
-  using PageOf::PageOf;
+using CCompControlParaTimeStepDlg = ValuePage<CCompControlParaTimeStepKvf>;
+using CCompControlParaTimeStepWQDlg = ValuePage<CCompControlParaTimeStepWQKvf>;
+using CCompControlParaPTDlg = ValuePage<CCompControlParaPTKvf>;
+using CCompControlParaOLDlg = ValuePage<CCompControlParaOLKvf>;
+using CCompControlParaUZDlg = ValuePage<CCompControlParaUZKvf>;
+using CCompControlParaSZDlg = ValuePage<CCompControlParaSZKvf>;
+using CCompControlParaColloidWQDlg = ValuePage<CCompControlParaColloidWQKvf>;
+using CAirFlowModDlg = ValuePage<CAirFlowModKvf>;
 
- protected:
-  void Describe(PageForm& form) override;
-};
-
-class CCompControlParaPTDlg : public PageOf<CCompControlParaPTKvf> {
- public:
-  using PageOf::PageOf;
-
- protected:
-  void Describe(PageForm& form) override;
-};
-
-class CCompControlParaOLDlg : public PageOf<CCompControlParaOLKvf> {
- public:
-  using PageOf::PageOf;
-
- protected:
-  void Describe(PageForm& form) override;
-};
-
-class CCompControlParaUZDlg : public PageOf<CCompControlParaUZKvf> {
- public:
-  using PageOf::PageOf;
-
- protected:
-  void Describe(PageForm& form) override;
-};
-
-class CCompControlParaSZDlg : public PageOf<CCompControlParaSZKvf> {
- public:
-  using PageOf::PageOf;
-
- protected:
-  void Describe(PageForm& form) override;
-};
-
-class CCompControlParaColloidWQDlg : public PageOf<CCompControlParaColloidWQKvf> {
- public:
-  using PageOf::PageOf;
-
- protected:
-  void Describe(PageForm& form) override;
-};
-
-class CAirFlowModDlg : public PageOf<CAirFlowModKvf> {
- public:
-  using PageOf::PageOf;
-
- protected:
-  void Describe(PageForm& form) override;
-};
+template <>
+void CCompControlParaTimeStepDlg::Describe(PageForm& form);
+template <>
+void CCompControlParaTimeStepWQDlg::Describe(PageForm& form);
+template <>
+void CCompControlParaPTDlg::Describe(PageForm& form);
+template <>
+void CCompControlParaOLDlg::Describe(PageForm& form);
+template <>
+void CCompControlParaUZDlg::Describe(PageForm& form);
+template <>
+void CCompControlParaSZDlg::Describe(PageForm& form);
+template <>
+void CCompControlParaColloidWQDlg::Describe(PageForm& form);
+template <>
+void CAirFlowModDlg::Describe(PageForm& form);
 
 }  // namespace tervane
