@@ -362,9 +362,12 @@ int OpenSection(KvfFile* file, KvfKind kind, std::string_view name) {
   return 1;
 }
 
-/// A further parameter of the current keyword, or null when there is none.
-KvfParam* NextParam(KvfFile* file, KvfType type) {
-  return file && file->currentKeyword ? &file->AddParam(*file->currentKeyword, type) : nullptr;
+/// A further parameter of the current keyword that is no text.
+template <class Value>
+int AddPlain(KvfFile* file, KvfType type, Value KvfParam::*member, Value value) {
+  if (!file || !file->currentKeyword) return 0;
+  file->AddParam(*file->currentKeyword, type).*member = value;
+  return 1;
 }
 
 int AddText(KvfFile* file, KvfType type, std::string_view value) {
@@ -397,22 +400,10 @@ int kvfAddKeyword(KvfFile* file, std::string_view name) {
   return 1;
 }
 
-int kvfAddInt(KvfFile* file, int value) {
-  KvfParam* param = NextParam(file, KvfType::Int);
-  return param ? (param->asInt = value, 1) : 0;
-}
-int kvfAddFloat(KvfFile* file, float value) {
-  KvfParam* param = NextParam(file, KvfType::Float);
-  return param ? (param->asFloat = value, 1) : 0;
-}
-int kvfAddDouble(KvfFile* file, double value) {
-  KvfParam* param = NextParam(file, KvfType::Double);
-  return param ? (param->asDouble = value, 1) : 0;
-}
-int kvfAddBool(KvfFile* file, bool value) {
-  KvfParam* param = NextParam(file, KvfType::Bool);
-  return param ? (param->asBool = value, 1) : 0;
-}
+int kvfAddInt(KvfFile* file, int value) { return AddPlain(file, KvfType::Int, &KvfParam::asInt, value); }
+int kvfAddFloat(KvfFile* file, float value) { return AddPlain(file, KvfType::Float, &KvfParam::asFloat, value); }
+int kvfAddDouble(KvfFile* file, double value) { return AddPlain(file, KvfType::Double, &KvfParam::asDouble, value); }
+int kvfAddBool(KvfFile* file, bool value) { return AddPlain(file, KvfType::Bool, &KvfParam::asBool, value); }
 int kvfAddString(KvfFile* file, std::string_view value) { return AddText(file, KvfType::String, value); }
 int kvfAddFilename(KvfFile* file, std::string_view value) { return AddText(file, KvfType::Filename, value); }
 
