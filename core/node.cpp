@@ -3,6 +3,7 @@
 #include "core/node.h"
 
 #include <algorithm>
+#include <atomic>
 #include <typeinfo>
 
 #include <fmt/format.h>
@@ -12,9 +13,16 @@
 
 namespace tervane {
 
+namespace {
+
+std::atomic<std::uint64_t> nextSerial{1};
+
+}  // namespace
+
 CYbSEKvfBase::CYbSEKvfBase(std::string title, std::string sectionName, CYbSEKvfBase* parent)
     : parent_(parent),
       root_(parent ? parent->root_ : nullptr),
+      serial_(nextSerial++),
       sectionName_(std::move(sectionName)),
       title_(std::move(title)) {}
 

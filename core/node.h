@@ -5,6 +5,7 @@
 // their defaults, declares their keys, checks them, and says whether it takes part in the setup.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <string>
@@ -88,6 +89,8 @@ class CYbSEKvfBase {
   int GetPropertyCount() const { return static_cast<int>(properties_.size()); }
 
   CYbSEKvfBase* GetParent() const { return parent_; }
+  /// The number of this node among all that the process made: what a view holds, since no later node has it.
+  std::uint64_t Serial() const { return serial_; }
   /// The root of the tree; null in a tree without one.
   CYbSEKvfGlobalBase* GetRoot() const { return root_; }
   /// The node registered under that name as a `Node`, or null.
@@ -199,6 +202,7 @@ class CYbSEKvfBase {
 
   CYbSEKvfBase* parent_;
   CYbSEKvfGlobalBase* root_;
+  const std::uint64_t serial_;
   // What every walk asks stands in front, close together: a walk over many nodes waits for memory more than it works.
   int touched_ = 0;
   int sectionNumber_ = -1;

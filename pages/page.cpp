@@ -15,8 +15,8 @@ void CYbSEDlgBase::Initialize() {
   SetData();
 }
 
-void CYbSEDlgBase::UpdateDoc(int hint, const std::string& action) const {
-  if (context_.updateDoc) context_.updateDoc(hint, action);
+void CYbSEDlgBase::UpdateDoc(int hint, const std::string& action, const void* source) const {
+  if (context_.updateDoc) context_.updateDoc(hint, action, source);
 }
 
 namespace {
@@ -37,7 +37,8 @@ std::string CYbSEDlgBase::Enter(Control& control, const std::string& typed) {
   if (control.revalidates && node_.GetRoot()) node_.GetRoot()->ReValidate();
   if (control.revalidatesLater) node_.SetRevalidateAll();
   SetData();
-  UpdateDoc(control.hint, fmt::format("Change {}", ActionName(control.label.empty() ? control.key : control.label)));
+  UpdateDoc(control.hint, fmt::format("Change {}", ActionName(control.label.empty() ? control.key : control.label)),
+            &control);
   return {};
 }
 
@@ -49,7 +50,8 @@ std::string CYbSEDlgBase::EnterCell(const Control& table, int row, int column, c
   if (table.table->Cell(row, column) == typed) return {};
   if (std::string expected = table.table->Enter(row, column, typed); !expected.empty()) return expected;
   UpdateDoc(kDataChanged,
-            fmt::format("Change {}", ActionName(table.table->Columns()[static_cast<std::size_t>(column - 1)].head)));
+            fmt::format("Change {}", ActionName(table.table->Columns()[static_cast<std::size_t>(column - 1)].head)),
+            &table);
   return {};
 }
 

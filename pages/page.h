@@ -16,8 +16,9 @@ namespace tervane {
 struct PageContext {
   CYbSEDocument& document;
   Host& host;
-  /// Marks the document modified and makes the views follow; `action` names what the user did ("Change End Date").
-  std::function<void(int hint, const std::string& action)> updateDoc;
+  /// Marks the document modified and makes the views follow; `action` names what the user did ("Change End Date"),
+  /// `source` is the control in which it was done, so that its changes in quick succession are undone as one.
+  std::function<void(int hint, const std::string& action, const void* source)> updateDoc;
 };
 
 /// A page: edits one node and holds no values of its own.
@@ -39,7 +40,7 @@ class CYbSEDlgBase {
   /// Types into a cell of a table.
   std::string EnterCell(const Control& table, int row, int column, const std::string& typed);
 
-  void UpdateDoc(int hint, const std::string& action) const;
+  void UpdateDoc(int hint, const std::string& action, const void* source = nullptr) const;
 
  protected:
   virtual void Describe(PageForm& form) = 0;

@@ -213,6 +213,12 @@ PageForm& PageForm::Group(std::string title) {
   return *control.group;
 }
 
+PageForm& PageForm::GroupBeside(std::string title) {
+  PageForm& group = Group(std::move(title));
+  controls_.back()->Beside();
+  return group;
+}
+
 Control& PageForm::SubForms(std::vector<std::shared_ptr<PageForm>> forms, std::function<int()> current) {
   Control& control = Add(ControlKind::SubForms, {});
   control.subForms = std::move(forms);

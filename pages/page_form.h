@@ -67,6 +67,7 @@ class Control {
   std::function<std::string(const std::string&)> enter;
   std::function<void()> press;  ///< Of a button.
   std::function<bool()> enabledWhen, shownWhen;
+  bool beside = false;  ///< Stands in the same row as the control before it.
   int hint = kDataChanged;
   bool revalidates = false;         ///< Other nodes' rules depend on the value.
   bool revalidatesLater = false;    ///< The same, at the next update of the views.
@@ -87,6 +88,7 @@ class Control {
   Control& EnabledWhen(std::function<bool()> rule) { return enabledWhen = std::move(rule), *this; }
   Control& ShownWhen(std::function<bool()> rule) { return shownWhen = std::move(rule), *this; }
   Control& Unit(std::string text_) { return unit = std::move(text_), *this; }
+  Control& Beside() { return beside = true, *this; }
   Control& Key(std::string name) { return key = std::move(name), *this; }
   Control& Revalidates() { return revalidates = true, *this; }
   Control& RevalidatesLater() { return revalidatesLater = true, *this; }
@@ -130,6 +132,8 @@ class PageForm {
   Control& Table(std::shared_ptr<TableForm> table);
   /// A frame with a title; the controls are added to the form that it holds.
   PageForm& Group(std::string title);
+  /// The same, in one row with the group before it.
+  PageForm& GroupBeside(std::string title);
   Control& SubForms(std::vector<std::shared_ptr<PageForm>> forms, std::function<int()> current);
 
   CYbSEKvfBase& Node() const { return node_; }

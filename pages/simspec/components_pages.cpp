@@ -12,15 +12,20 @@ std::shared_ptr<PageForm> ModelCompForm(CModelCompKvf& n) {
   const auto withWaterMovement = [&n] { return n.WM != 0; };
   const auto withWaterQuality = [&n] { return n.WQ != 0; };
   form->Check("Overland Flow (OL)", n.OL).EnabledWhen(withWaterMovement).Revalidates();
-  form->Choice("", n.OL_ModelType, {"Finite Difference", "Subcatchment based"}).EnabledWhen([&n] { return n.OL != 0; });
+  form->Choice("", n.OL_ModelType, {"Finite Difference", "Subcatchment based"}).Beside().EnabledWhen([&n] {
+    return n.OL != 0;
+  });
   form->Check("Rivers and Lakes (OC)", n.River).EnabledWhen(withWaterMovement).Revalidates();
   form->Check("Unsaturated Flow (UZ)", n.UZ).EnabledWhen(withWaterMovement).Revalidates();
   form->Choice("", n.UZ_ModelType, {"Richards equation", "Gravity Flow", "2 Layer UZ"})
+      .Beside()
       .EnabledWhen([&n] { return n.UZ != 0; })
       .Revalidates();
   form->Check("Evapotranspiration (ET)", n.ET).EnabledWhen(withWaterMovement).Revalidates();
   form->Check("Saturated Flow (SZ)", n.SZ).EnabledWhen(withWaterMovement).Revalidates();
-  form->Choice("", n.SZ_ModelType, {"Finite Difference", "Linear Reservoir"}).EnabledWhen([&n] { return n.SZ != 0; });
+  form->Choice("", n.SZ_ModelType, {"Finite Difference", "Linear Reservoir"}).Beside().EnabledWhen([&n] {
+    return n.SZ != 0;
+  });
   form->Check("Include Advection-Dispersion (AD) Water Quality", n.WQ).Revalidates();
   form->Radio("", n.ADPTRadio,
               {"Calculate WQ using the finite difference, Advection-Dispersion (AD) method",
@@ -51,15 +56,18 @@ std::shared_ptr<PageForm> ModModelCompForm(CModModelCompKvf& n, int engine) {
               [&n](int choice) { n.ChooseVariablySaturated(choice); },
               {"Block Centered Flow (BCF)", "Variably Saturated Flow"})
           .Key("Subsurface_ModelType")
+          .Beside()
           .EnabledWhen(withSubsurface);
       break;
     case kEngineModflow96:
       form->Choice(
               "", [] { return 0; }, [](int) {}, {"Block Centered Flow (BCF)"})
+          .Beside()
           .EnabledWhen(withSubsurface);
       break;
     default:
       form->Choice("", n.Modflow2000_BCFType, {"Block Centered Flow (BCF)", "Layer Property Flow (LPF)"})
+          .Beside()
           .EnabledWhen(withSubsurface);
   }
   form->Check("With cell rewetting", n.WithCellRewetting).EnabledWhen([isVariablySaturated] {
@@ -71,6 +79,7 @@ std::shared_ptr<PageForm> ModModelCompForm(CModModelCompKvf& n, int engine) {
   form->Check("Recharge", n.Recharge);
   form->Choice("", n.Recharge_ModelType, {"MODFLOW Recharge", "Recharge-Seepage Face"})
       .Key("Recharge_ModelType")
+      .Beside()
       .EnabledWhen([&n, engine] { return engine == kEngineModflowSurfact && n.Recharge != 0; });
   return form;
 }
@@ -103,7 +112,7 @@ void CModelCompWQDlg::Describe(PageForm& form) {
         })
         .Revalidates();
     // What the water movement has stands beside it, and is changed on its own page.
-    form.Shown("WM", [&water, component] { return std::string(water.*component ? "on" : "off"); });
+    form.Shown("WM", [&water, component] { return std::string(water.*component ? "on" : "off"); }).Beside();
   };
   add("Overland Flow (OL)", n.OL, &CModelCompKvf::OL, true);
   add("Rivers and Lakes (OC), Requires WQ in Overland Flow", n.River, &CModelCompKvf::River, true);

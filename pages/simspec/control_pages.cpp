@@ -33,7 +33,7 @@ void CCompControlParaTimeStepWQDlg::Describe(PageForm& form) {
   const auto* waterQuality = dynamic_cast<const CModelCompWQKvf*>(n.GetParent());
   const auto column = [&](const char* title, Limits& limits, int CModelCompWQKvf::*component) {
     const auto takesPart = [waterQuality, component] { return waterQuality && waterQuality->*component; };
-    PageForm& group = form.Group(title);
+    PageForm& group = form.Controls().empty() ? form.Group(title) : form.GroupBeside(title);
     group.Number("Max. Simulation time step:", limits.MaxSimTimeStep, "%.1e").Unit("hours").EnabledWhen(takesPart);
     group.Number("Max. Advective Courant Number:", limits.MaxAdvectiveCourant).EnabledWhen(takesPart);
     group.Number("Max. Dispersive Courant Number:", limits.MaxDispersiveCourant).EnabledWhen(takesPart);

@@ -25,7 +25,7 @@ PageDriver::PageDriver(CFlowModelDoc& document, std::string_view path) {
   CYbSEKvfBase* node = FindNode(document.Root(), ParseSetupPath(path).steps);
   const PageClass* pageClass = node ? node->GetDlgRuntimeClass(kSetupDataTree) : nullptr;
   if (pageClass)
-    page_ = MakePage(*pageClass, *node, {document, host_, [this](int hint, const std::string& action) {
+    page_ = MakePage(*pageClass, *node, {document, host_, [this](int hint, const std::string& action, const void*) {
                                            changes_.push_back(fmt::format("{} {}", hint, action));
                                          }});
   if (!page_) throw std::runtime_error(fmt::format("{} has no page", path));
