@@ -7,29 +7,9 @@
 #include "cli/commands.h"
 #include "cli/setup_file.h"
 #include "pages/page.h"
+#include "pages/tree_entries.h"
 
 namespace tervane {
-
-namespace {
-
-/// A command that only shows a page is asked nothing.
-class NobodyToAsk : public Host {
- public:
-  Answer Ask(const std::string& /*text*/, Icon /*icon*/, Buttons /*buttons*/) override { return Answer::Cancel; }
-  std::optional<std::string> AskFileToOpen(const FileQuestion& /*question*/) override { return std::nullopt; }
-  std::optional<std::string> AskFileToSave(const FileQuestion& /*question*/) override { return std::nullopt; }
-  void OpenBrowser(const std::string& /*address*/) override {}
-  std::string Setting(const std::string& /*name*/) const override { return {}; }
-  void SetSetting(const std::string& /*name*/, const std::string& /*value*/) override {}
-};
-
-const PageClass* PageClassOf(const CYbSEKvfBase& node) {
-  for (const int tree : {kSetupDataTree, kProcessedDataTree, kResultsTree})
-    if (const PageClass* page = node.GetDlgRuntimeClass(tree)) return page;
-  return nullptr;
-}
-
-}  // namespace
 
 int PageCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;

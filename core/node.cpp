@@ -290,11 +290,9 @@ namespace {
 
 void WalkBelow(CYbSEKvfBase& node, const std::string& path, int depth, bool takesPart,
                const std::function<void(const NodePlace&)>& visit) {
-  std::unordered_map<std::string, int> instances;
+  ChildSteps steps(node);
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
-    const std::string name = StepName(*child);
-    const NodePlace place{*child, JoinPath(path, PathName(name, ++instances[name])), depth,
-                          takesPart && child->IsDlgUsedInSetup()};
+    const NodePlace place{*child, JoinPath(path, steps.StepOf(*child)), depth, takesPart && child->IsDlgUsedInSetup()};
     visit(place);
     WalkBelow(*child, place.path, depth + 1, place.takesPart, visit);
   }
@@ -308,6 +306,22 @@ void WalkNodes(CYbSEKvfBase& root, const std::function<void(const NodePlace&)>& 
 
 std::string StepName(const CYbSEKvfBase& node) {
   return node.GetSectionName().empty() ? ClassNameOf(node) : node.FormattedSectionName();
+}
+
+std::string ChildSteps::StepOf(const CYbSEKvfBase& child) {
+  for (; next_; next_ = parent_.GetNextChild(next_)) {
+    const std::string name = StepName(*next_);
+    const int instance = ++instances_[name];
+    if (next_ != &child) continue;
+    next_ = parent_.GetNextChild(next_);
+    return PathName(name, instance);
+  }
+  return {};
+}
+
+std::string PathOf(const CYbSEKvfBase& node) {
+  const CYbSEKvfBase* parent = node.GetParent();
+  return parent ? JoinPath(PathOf(*parent), ChildSteps(*parent).StepOf(node)) : std::string();
 }
 
 CYbSEKvfBase* FindChild(const CYbSEKvfBase& parent, const PathStep& step) {

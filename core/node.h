@@ -322,6 +322,21 @@ struct NodePlace {
 /// Visits all nodes below the root, parents first, in the order of the walk.
 void WalkNodes(CYbSEKvfBase& root, const std::function<void(const NodePlace&)>& visit);
 
+/// The steps of a path to the children of a node. To be asked in the order of the walk; each child costs its own step
+/// and those that were passed over, and nobody asked costs nothing.
+class ChildSteps {
+ public:
+  explicit ChildSteps(const CYbSEKvfBase& parent) : parent_(parent), next_(parent.GetFirstChild()) {}
+  std::string StepOf(const CYbSEKvfBase& child);
+
+ private:
+  const CYbSEKvfBase& parent_;
+  CYbSEKvfBase* next_;
+  std::unordered_map<std::string, int> instances_;
+};
+/// The path of one node, as a walk gives it; empty for the root.
+std::string PathOf(const CYbSEKvfBase& node);
+
 /// The child that a step of a path names, or null.
 CYbSEKvfBase* FindChild(const CYbSEKvfBase& parent, const PathStep& step);
 /// The node at the end of the steps, or null; no steps lead to the root itself.

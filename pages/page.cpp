@@ -2,16 +2,22 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/page.h"
 
+#include <algorithm>
+
 #include <fmt/format.h>
 
-#include "pages/table_form.h"
 #include "platform/text.h"
 
 namespace tervane {
 
-void CYbSEDlgBase::Initialize() {
+void CYbSEDlgBase::MakeForm() {
   form_ = std::make_unique<PageForm>(node_);
   Describe(*form_);
+  form_->SetDisplayUnits(context_.displayUnits);
+}
+
+void CYbSEDlgBase::Initialize() {
+  MakeForm();
   SetData();
 }
 
@@ -53,6 +59,42 @@ std::string CYbSEDlgBase::EnterCell(const Control& table, int row, int column, c
             fmt::format("Change {}", ActionName(table.table->Columns()[static_cast<std::size_t>(column - 1)].head)),
             &table);
   return {};
+}
+
+bool CYbSEDlgBase::Tell(int hint, const std::string& action) {
+  if (hint == 0) return false;
+  SetData();
+  // Without a source, so that no two operations are undone as one.
+  UpdateDoc(hint, action);
+  return true;
+}
+
+bool CYbSEDlgBase::ChangeRows(const Control& table, RowAction action, int first, int last) {
+  const int rows = first < 1 ? 1 : std::min(last, table.table->RowCount()) - first + 1;
+  const int hint = table.table->ChangeRows(action, first, last);
+  return Tell(hint, table.table->ActionName(action, rows));
+}
+
+bool CYbSEDlgBase::ChangeRow(const Control& table, RowAction action, int row) {
+  return Tell(table.table->ChangeRow(action, row), table.table->ActionName(action, 1));
+}
+
+CellsResult CYbSEDlgBase::Paste(const Control& table, const CellRange& selected, std::string_view text) {
+  CellsResult result = table.table->Paste(selected, text);
+  Tell(result.hint, "Paste");
+  return result;
+}
+
+CellsResult CYbSEDlgBase::FillDown(const Control& table, const CellRange& cells) {
+  CellsResult result = table.table->FillDown(cells);
+  Tell(result.hint, "Fill Down");
+  return result;
+}
+
+CellsResult CYbSEDlgBase::ClearCells(const Control& table, const CellRange& cells) {
+  CellsResult result = table.table->Clear(cells);
+  Tell(result.hint, "Clear");
+  return result;
 }
 
 }  // namespace tervane

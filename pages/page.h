@@ -8,6 +8,7 @@
 
 #include "core/document.h"
 #include "pages/page_form.h"
+#include "pages/table_form.h"
 #include "platform/host.h"
 
 namespace tervane {
@@ -19,6 +20,8 @@ struct PageContext {
   /// Marks the document modified and makes the views follow; `action` names what the user did ("Change End Date"),
   /// `source` is the control in which it was done, so that its changes in quick succession are undone as one.
   std::function<void(int hint, const std::string& action, const void* source)> updateDoc;
+  /// The user's units; null for base units. They outlive the page.
+  const DisplayUnits* displayUnits = nullptr;
 };
 
 /// A page: edits one node and holds no values of its own.
@@ -32,6 +35,8 @@ class CYbSEDlgBase {
   virtual void Initialize();
   /// Called when the page is shown and after every change: what the form's rules do not say themselves.
   virtual void SetData() {}
+  /// Makes the form and nothing else, for who only reads what a page holds.
+  void MakeForm();
   PageForm& Form() const { return *form_; }
 
   /// Types a value into a control. Gives what was expected when the control refuses it; the node is then unchanged.
@@ -40,6 +45,17 @@ class CYbSEDlgBase {
   /// Types into a cell of a table.
   std::string EnterCell(const Control& table, int row, int column, const std::string& typed);
 
+  // Operations on a table, each told to the document as one change of a readable name. `table` is a control of this
+  // page.
+
+  /// Whole rows, as the buttons beside a table do it; 0 for no whole row. False when nothing was changed.
+  bool ChangeRows(const Control& table, RowAction action, int first, int last);
+  /// The row of the current cell, as the keys with Ctrl do it. False when nothing was changed: the cell then stays.
+  bool ChangeRow(const Control& table, RowAction action, int row);
+  CellsResult Paste(const Control& table, const CellRange& selected, std::string_view text);
+  CellsResult FillDown(const Control& table, const CellRange& cells);
+  CellsResult ClearCells(const Control& table, const CellRange& cells);
+
   void UpdateDoc(int hint, const std::string& action, const void* source = nullptr) const;
 
  protected:
@@ -47,6 +63,9 @@ class CYbSEDlgBase {
   const PageContext& Context() const { return context_; }
 
  private:
+  /// Tells the document of a change in a table; false when there was none.
+  bool Tell(int hint, const std::string& action);
+
   CYbSEKvfBase& node_;
   PageContext context_;
   std::unique_ptr<PageForm> form_;
@@ -62,5 +81,7 @@ class PageOf : public CYbSEDlgBase {
 
 /// The page of a node by its class; null when the class is unknown or the node is of another class than the page edits.
 std::unique_ptr<CYbSEDlgBase> MakePage(const PageClass& page, CYbSEKvfBase& node, PageContext context);
+/// The same with its form alone: nothing is read, validated or changed for it.
+std::unique_ptr<CYbSEDlgBase> MakePageToRead(const PageClass& page, CYbSEKvfBase& node, PageContext context);
 
 }  // namespace tervane

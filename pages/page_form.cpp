@@ -4,12 +4,10 @@
 
 #include <array>
 #include <charconv>
-#include <cstdio>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
-#include "pages/entry.h"
 #include "pages/table_form.h"
 #include "platform/paths.h"
 #include "platform/text.h"
@@ -32,16 +30,6 @@ int Control::Option() const {
 }
 
 namespace {
-
-std::string Formatted(double value, const std::string& format) {
-  std::array<char, 512> buffer;
-  const int size = std::snprintf(buffer.data(), buffer.size(), format.c_str(), value);
-  std::string text(buffer.data(), static_cast<std::size_t>(std::clamp(size, 0, 511)));
-  // The C library follows the locale; setups and their users do not.
-  for (char& c : text)
-    if (c == ',') c = '.';
-  return text;
-}
 
 std::string EnterInt(const std::string& typed, const std::function<void(int)>& set) {
   int number = 0;
@@ -128,10 +116,12 @@ Control& PageForm::Integer(std::string label, int& value) {
 template <class Real>
 Control& PageForm::AddNumber(std::string label, Real& value, std::string format) {
   Control& control = AddBound(ControlKind::Number, std::move(label), &value);
-  control.text = [&value, format = std::move(format)] {
-    return format.empty() ? ShortestNumber(value) : Formatted(static_cast<double>(value), format);
+  control.text = [&value, &control, format = std::move(format)] {
+    return ShownNumber(value, control.NumberUnit(), format);
   };
-  control.enter = [&value](const std::string& typed) { return EnterValue(value, typed); };
+  control.enter = [&value, &control](const std::string& typed) {
+    return EnterNumber(value, typed, control.NumberUnit());
+  };
   return control;
 }
 
@@ -234,6 +224,13 @@ void PageForm::ForEach(const std::function<void(Control&)>& visit) {
   }
 }
 
+void PageForm::SetDisplayUnits(const DisplayUnits* units) {
+  ForEach([units](Control& control) {
+    control.displayUnits = units;
+    if (control.table) control.table->SetDisplayUnits(units);
+  });
+}
+
 namespace {
 
 std::string ShownValue(const Control& control) {
@@ -267,9 +264,10 @@ std::string FormText(PageForm& form, int level) {
   std::string text;
   for (const auto& control : form.Controls()) {
     const std::string indent(2 * static_cast<std::size_t>(level), ' ');
+    const std::string unit = control->UnitText();
     text += fmt::format("{}{} \"{}\"{}{}{}{}\n", indent, KindName(control->kind), Replaced(control->label, "\n", " "),
-                        ShownValue(*control), control->unit.empty() ? "" : " " + control->unit,
-                        control->IsEnabled() ? "" : " disabled", control->IsShown() ? "" : " hidden");
+                        ShownValue(*control), unit.empty() ? "" : " " + unit, control->IsEnabled() ? "" : " disabled",
+                        control->IsShown() ? "" : " hidden");
     if (control->group) text += FormText(*control->group, level + 1);
     if (control->table) text += TableText(*control->table, level + 1);
     if (control->kind == ControlKind::SubForms) {

@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "core/node.h"
+#include "pages/entry.h"
 #include "platform/dates.h"
 #include "platform/host.h"
 
@@ -57,7 +58,9 @@ class Control {
  public:
   ControlKind kind = ControlKind::Label;
   std::string label;
-  std::string unit;                                   ///< Shown behind the value; empty for none.
+  std::string unit;                                   ///< A fixed unit; `UnitText` tells what is shown.
+  int itemType = 0;                                   ///< The number is a quantity of that item type; 0 for none.
+  const DisplayUnits* displayUnits = nullptr;         ///< The user's units; null for base units.
   std::function<std::vector<std::string>()> options;  ///< Of a radio group or drop list.
   std::string key;                                    ///< Of the node, so that a finding leads here.
   const CYbSEKvfBase* node = nullptr;
@@ -80,6 +83,11 @@ class Control {
   bool IsShown() const { return !shownWhen || shownWhen(); }
   std::string Text() const { return text ? text() : std::string(); }
   std::vector<std::string> Options() const { return options ? options() : std::vector<std::string>(); }
+  FieldUnit NumberUnit() const { return {unit, itemType, displayUnits}; }
+  /// The unit behind the value, as the user's choice is now; empty for none.
+  std::string UnitText() const { return itemType ? NumberUnit().Text() : unit; }
+  /// The units that a user may choose to see the quantity in; empty where there is nothing to choose.
+  std::vector<UnitChoice> UnitChoices() const { return NumberUnit().Choices(); }
   /// The number of the chosen option, or -1 when the value is none of them.
   int Option() const;
 
@@ -88,6 +96,8 @@ class Control {
   Control& EnabledWhen(std::function<bool()> rule) { return enabledWhen = std::move(rule), *this; }
   Control& ShownWhen(std::function<bool()> rule) { return shownWhen = std::move(rule), *this; }
   Control& Unit(std::string text_) { return unit = std::move(text_), *this; }
+  /// The node stores the base unit of that item type; the number is shown and typed in the user's unit.
+  Control& Quantity(int itemType_) { return itemType = itemType_, *this; }
   Control& Beside() { return beside = true, *this; }
   Control& Key(std::string name) { return key = std::move(name), *this; }
   Control& Revalidates() { return revalidates = true, *this; }
@@ -117,7 +127,8 @@ class PageForm {
   Control& Text(std::string label, std::string& value);
   Control& LongText(std::string label, std::string& value);
   Control& Integer(std::string label, int& value);
-  /// A number as it is stored. `format` is a printf format of one double, such as "%.1e"; empty for the shortest form.
+  /// A number as it is stored, unless `Quantity` is said behind it. `format` is a printf format of one double, such as
+  /// "%.1e"; empty for the shortest form.
   Control& Number(std::string label, float& value, std::string format = {});
   Control& Number(std::string label, double& value, std::string format = {});
   Control& Date(std::string label, CYbDateTime& value);
@@ -142,6 +153,10 @@ class PageForm {
 
   /// Calls `visit` for all controls, also of groups and sub-forms.
   void ForEach(const std::function<void(Control&)>& visit);
+
+  /// Shows and takes quantities in these units from now on, also in groups, sub-forms and tables; they are asked each
+  /// time and must outlive the form. Null for base units.
+  void SetDisplayUnits(const DisplayUnits* units);
 
   /// How dates are shown and typed.
   static constexpr std::string_view kDateFormat = "%Y/%m/%d  %H:%M";

@@ -53,16 +53,24 @@ const std::array kPages{
     PageRow{kControlSZPage, Make<CCompControlParaSZDlg, CCompControlParaSZKvf>},
 };
 
+std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, PageContext context) {
+  for (const PageRow& row : kPages)
+    if (row.page.name == page.name) return row.make(node, std::move(context));
+  return nullptr;
+}
+
 }  // namespace
 
 std::unique_ptr<CYbSEDlgBase> MakePage(const PageClass& page, CYbSEKvfBase& node, PageContext context) {
-  for (const PageRow& row : kPages) {
-    if (row.page.name != page.name) continue;
-    std::unique_ptr<CYbSEDlgBase> made = row.make(node, std::move(context));
-    if (made) made->Initialize();
-    return made;
-  }
-  return nullptr;
+  std::unique_ptr<CYbSEDlgBase> made = Construct(page, node, std::move(context));
+  if (made) made->Initialize();
+  return made;
+}
+
+std::unique_ptr<CYbSEDlgBase> MakePageToRead(const PageClass& page, CYbSEKvfBase& node, PageContext context) {
+  std::unique_ptr<CYbSEDlgBase> made = Construct(page, node, std::move(context));
+  if (made) made->MakeForm();
+  return made;
 }
 
 }  // namespace tervane

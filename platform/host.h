@@ -39,4 +39,15 @@ class Host {
   virtual void SetSetting(const std::string& name, const std::string& value) = 0;
 };
 
+/// A host for what only shows pages: every question is given up, nothing is kept.
+class NobodyToAsk : public Host {
+ public:
+  Answer Ask(const std::string& /*text*/, Icon /*icon*/, Buttons /*buttons*/) override { return Answer::Cancel; }
+  std::optional<std::string> AskFileToOpen(const FileQuestion& /*question*/) override { return std::nullopt; }
+  std::optional<std::string> AskFileToSave(const FileQuestion& /*question*/) override { return std::nullopt; }
+  void OpenBrowser(const std::string& /*address*/) override {}
+  std::string Setting(const std::string& /*name*/) const override { return {}; }
+  void SetSetting(const std::string& /*name*/, const std::string& /*value*/) override {}
+};
+
 }  // namespace tervane

@@ -80,6 +80,12 @@ bool EqualIgnoringCase(std::string_view a, std::string_view b) {
                     [](char x, char y) { return LowerAscii(x) == LowerAscii(y); });
 }
 
+std::string LowerCase(std::string_view text) {
+  std::string lower(text);
+  std::ranges::transform(lower, lower.begin(), LowerAscii);
+  return lower;
+}
+
 std::string Replaced(std::string_view text, std::string_view from, std::string_view to) {
   std::string result;
   result.reserve(text.size());

@@ -17,6 +17,9 @@ std::string_view Trimmed(std::string_view text);
 /// Equal when the case of ASCII letters is ignored.
 bool EqualIgnoringCase(std::string_view a, std::string_view b);
 
+/// The text with its ASCII letters in lower case.
+std::string LowerCase(std::string_view text);
+
 /// The text with every `from` replaced by `to`; `from` must not be empty.
 std::string Replaced(std::string_view text, std::string_view from, std::string_view to);
 

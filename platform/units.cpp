@@ -71,12 +71,6 @@ std::string Folded(std::string_view text) {
   return result;
 }
 
-std::string Lower(std::string text) {
-  std::ranges::transform(text, text.begin(),
-                         [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + 32) : c; });
-  return text;
-}
-
 /// The table's units by their names. Abbreviations and aliases are told apart by case (mg, Mg), texts are not.
 struct NamesOfUnits {
   std::unordered_map<std::string, const Unit*> abbreviations;
@@ -84,7 +78,7 @@ struct NamesOfUnits {
 
   NamesOfUnits() {
     for (const Unit& unit : AllUnits()) {
-      texts.emplace(Lower(Folded(unit.text)), &unit);
+      texts.emplace(LowerCase(Folded(unit.text)), &unit);
       if (!unit.abbreviation.empty()) abbreviations.emplace(Folded(unit.abbreviation), &unit);
       for (std::string_view rest = unit.aliases; !rest.empty();) {
         const std::size_t end = std::min(rest.find('|'), rest.size());
@@ -99,7 +93,7 @@ const Unit* UnitNamed(std::string_view text) {
   static const NamesOfUnits names;
   const std::string folded = Folded(text);
   if (const auto found = names.abbreviations.find(folded); found != names.abbreviations.end()) return found->second;
-  if (const auto found = names.texts.find(Lower(folded)); found != names.texts.end()) return found->second;
+  if (const auto found = names.texts.find(LowerCase(folded)); found != names.texts.end()) return found->second;
   return nullptr;
 }
 
@@ -235,19 +229,44 @@ std::optional<NumberFormat> ParseNumberFormat(std::string_view format) {
   return std::nullopt;
 }
 
-std::string FormatNumber(double value, std::string_view format) {
-  if (format.empty()) return ShortestNumber(value);
-  const std::optional<NumberFormat> parsed = ParseNumberFormat(format);
-  assert(parsed && "not a format for one number");
-  const NumberFormat numberFormat = parsed.value_or(NumberFormat{});
-  if (format.ends_with('d')) value = std::round(value) + 0.0;  // + 0.0: a rounded -0.2 is 0
-  std::array<char, std::numeric_limits<double>::max_exponent10 + 120> buffer;
-  const auto [end, error] =
-      std::to_chars(buffer.data(), buffer.data() + buffer.size(), value, numberFormat.style, numberFormat.precision);
-  return {buffer.data(), end};
+ParsedQuantity Refused(std::string error) { return {0, std::move(error)}; }
+
+/// What a user typed, taken apart.
+struct NumberAndUnit {
+  double number = 0;
+  std::string unit;   ///< Empty when the number stands alone.
+  std::string error;  ///< Why it begins with no number.
+};
+
+/// `name` is what an empty text was expected to be; may be empty.
+NumberAndUnit SplitQuantity(std::string_view text, std::string_view name) {
+  const auto refused = [](std::string error) { return NumberAndUnit{0, {}, std::move(error)}; };
+  const std::string ascii = AsciiSpelling(text);
+  std::string_view rest = ascii;
+  if (rest.empty()) return refused(fmt::format("{}{}a number was expected", name, name.empty() ? "" : ": "));
+  if (rest.starts_with('+') && !rest.starts_with("+-")) rest.remove_prefix(1);
+  double value = 0;
+  const auto [end, error] = std::from_chars(rest.data(), rest.data() + rest.size(), value);
+  const std::string_view number = rest.substr(0, static_cast<std::size_t>(end - rest.data()));
+  const bool beginsWithComma = rest.starts_with(',') || rest.starts_with("-,");
+  // Letters alone are "inf" and "nan", which no quantity is.
+  if (!beginsWithComma && (error == std::errc::invalid_argument || std::ranges::none_of(number, IsDigit))) {
+    return refused(fmt::format("\"{}\": a number was expected", Trimmed(text)));
+  }
+  rest.remove_prefix(number.size());
+  if (beginsWithComma || rest.starts_with(',')) {
+    return refused(
+        fmt::format("\"{}\": use a point for decimals, as in 1.5, and nothing between thousands", Trimmed(text)));
+  }
+  if (error == std::errc::result_out_of_range) {
+    return refused(fmt::format("\"{}\" is too large or too small", Trimmed(text)));
+  }
+  return {value, std::string(Trimmed(rest)), {}};
 }
 
-ParsedQuantity Refused(std::string error) { return {0, std::move(error)}; }
+std::optional<ParsedUnit> TypedUnit(const std::string_view unit) {
+  return UnitNamed(unit) != nullptr || !HasLooseNumber(unit) ? ParseUnit(unit) : std::nullopt;
+}
 
 }  // namespace
 
@@ -303,42 +322,21 @@ std::optional<ParsedUnit> ParseUnit(std::string_view text) {
 }
 
 ParsedQuantity ParseQuantity(std::string_view text, const ItemType& itemType, int displayUnitKey) {
-  const std::string ascii = AsciiSpelling(text);
-  std::string_view rest = ascii;
-  if (rest.empty()) return Refused(fmt::format("{}: a number was expected", itemType.name));
-  if (rest.starts_with('+') && !rest.starts_with("+-")) rest.remove_prefix(1);
-  double value = 0;
-  const auto [end, error] = std::from_chars(rest.data(), rest.data() + rest.size(), value);
-  const std::string_view number = rest.substr(0, static_cast<std::size_t>(end - rest.data()));
-  const bool beginsWithComma = rest.starts_with(',') || rest.starts_with("-,");
-  // Letters alone are "inf" and "nan", which no quantity is.
-  if (!beginsWithComma && (error == std::errc::invalid_argument || std::ranges::none_of(number, IsDigit))) {
-    return Refused(fmt::format("\"{}\": a number was expected", Trimmed(text)));
-  }
-  rest.remove_prefix(number.size());
-  if (beginsWithComma || rest.starts_with(',')) {
-    return Refused(
-        fmt::format("\"{}\": use a point for decimals, as in 1.5, and nothing between thousands", Trimmed(text)));
-  }
-  if (error == std::errc::result_out_of_range) {
-    return Refused(fmt::format("\"{}\" is too large or too small", Trimmed(text)));
-  }
-
+  const NumberAndUnit typed = SplitQuantity(text, itemType.name);
+  if (!typed.error.empty()) return Refused(typed.error);
   const Unit& base = BaseUnit(itemType);
   UnitScale scale = DisplayUnit(itemType, displayUnitKey).scale;
-  rest = Trimmed(rest);
-  if (!rest.empty()) {
-    const bool mayAsk = UnitNamed(rest) != nullptr || !HasLooseNumber(rest);
-    const std::optional<ParsedUnit> typed = mayAsk ? ParseUnit(rest) : std::nullopt;
-    if (!typed || typed->scale.dimension != base.scale.dimension) {
+  if (!typed.unit.empty()) {
+    const std::optional<ParsedUnit> unit = TypedUnit(typed.unit);
+    if (!unit || unit->scale.dimension != base.scale.dimension) {
       const std::string allowed = UnitsAllowedBy(itemType);
       if (allowed.empty()) return Refused(fmt::format("\"{}\": {} has no unit", Trimmed(text), itemType.name));
       return Refused(fmt::format("\"{}\": \"{}\" is no unit of {}, which takes {} and what converts to them",
-                                 Trimmed(text), rest, itemType.name, allowed));
+                                 Trimmed(text), typed.unit, itemType.name, allowed));
     }
-    scale = typed->scale;
+    scale = unit->scale;
   }
-  value = (*ConversionBetween(scale, base.scale))(value);
+  const double value = (*ConversionBetween(scale, base.scale))(typed.number);
   if (!std::isfinite(value)) return Refused(fmt::format("\"{}\" is too large", Trimmed(text)));
   if (base.key == kWholeNumberUnit &&
       (std::trunc(value) != value || std::abs(value) > std::numeric_limits<int>::max())) {
@@ -346,6 +344,40 @@ ParsedQuantity ParseQuantity(std::string_view text, const ItemType& itemType, in
                                std::numeric_limits<int>::digits10));
   }
   return {value, {}};
+}
+
+ParsedQuantity ParseQuantity(std::string_view text, std::string_view unit) {
+  const NumberAndUnit typed = SplitQuantity(text, {});
+  if (!typed.error.empty()) return Refused(typed.error);
+  std::string_view own = Trimmed(unit);
+  if (own.starts_with('[') && own.ends_with(']')) own = Trimmed(own.substr(1, own.size() - 2));
+  const bool isOwn = typed.unit == own || typed.unit == Trimmed(unit);
+  if (typed.unit.empty() || isOwn) return {typed.number, {}};
+  // What nobody can convert ("[-]", "[g metabolite/ g pesticide]") takes numbers alone.
+  const std::optional<ParsedUnit> target = TypedUnit(own);
+  const std::optional<ParsedUnit> source = target ? TypedUnit(typed.unit) : std::nullopt;
+  const auto conversion = source ? ConversionBetween(source->scale, target->scale) : std::nullopt;
+  if (!conversion) {
+    const std::string_view offer = target ? " or in a unit that converts to it" : "";
+    return Refused(own.empty() || own == "-"
+                       ? fmt::format("\"{}\": a number without a unit was expected", Trimmed(text))
+                       : fmt::format("\"{}\": a number in {}{} was expected", Trimmed(text), own, offer));
+  }
+  const double value = (*conversion)(typed.number);
+  if (!std::isfinite(value)) return Refused(fmt::format("\"{}\" is too large", Trimmed(text)));
+  return {value, {}};
+}
+
+std::string FormatNumber(double value, std::string_view format) {
+  if (format.empty()) return ShortestNumber(value);
+  const std::optional<NumberFormat> parsed = ParseNumberFormat(format);
+  assert(parsed && "not a format for one number");
+  const NumberFormat numberFormat = parsed.value_or(NumberFormat{});
+  if (format.ends_with('d')) value = std::round(value) + 0.0;  // + 0.0: a rounded -0.2 is 0
+  std::array<char, std::numeric_limits<double>::max_exponent10 + 120> buffer;
+  const auto [end, error] =
+      std::to_chars(buffer.data(), buffer.data() + buffer.size(), value, numberFormat.style, numberFormat.precision);
+  return {buffer.data(), end};
 }
 
 std::string FormatQuantity(double baseValue, const ItemType& itemType, int displayUnitKey, std::string_view format) {

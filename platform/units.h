@@ -132,6 +132,14 @@ struct ParsedQuantity {
 /// process's locale. An item type of whole numbers takes nothing else.
 ParsedQuantity ParseQuantity(std::string_view text, const ItemType& itemType, int displayUnitKey);
 
+/// The same for a number in the unit of that text, as a label shows it: "hours", "[m/d]". Only a text that is no number
+/// alone makes anybody read the unit, which costs UDUNITS its time to load.
+ParsedQuantity ParseQuantity(std::string_view text, std::string_view unit);
+
+/// A number as a printf format of one number says, or for an empty one the shortest text that reads back to the same
+/// bits; the decimal point is a point in every locale.
+std::string FormatNumber(double value, std::string_view format);
+
 /// A value in the base unit as a number in the display unit, without the unit. `format` is one of printf's for one
 /// number, "%.6g" "%.2f" "%e" "%d" (rounded to a whole number), or empty for the shortest text that reads back to the
 /// same bits; the decimal point is a point in every locale.

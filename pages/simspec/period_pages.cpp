@@ -100,6 +100,7 @@ void CSimPeriodOnFlowDlg::Describe(PageForm& form) {
 void CExtraParamsDlg::Describe(PageForm& form) {
   using Item = CExtraParamsItemKvf;
   auto table = std::make_shared<TableForm>(Node());
+  table->ItemName("Parameter");
   table->Column<Item>("Name", 220, CellKind::Text, [](Item& item) -> std::string& { return item.Name; });
   table->Choice<Item>("Type", 100, [](Item& item) -> int& { return item.Type; },
                       {"Float", "Integer", "Bool", "Text", "Filename"});

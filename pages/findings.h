@@ -1,0 +1,34 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "core/document.h"
+
+namespace tervane {
+
+/// Something wrong in a setup, of any origin: met while the file was read, found by validation, or never read.
+struct SetupFinding {
+  enum class Kind { Error, Warning, Note, Unread };
+
+  Kind kind;
+  std::string path;
+  std::string text;
+  std::string key;           ///< May be empty.
+  std::string detail;        ///< The reason behind a fixed text; may be empty.
+  int line = 0;              ///< Of the file that was read; 0 when it speaks of no line.
+  std::uint64_t serial = 0;  ///< Of the node at the path, or of the nearest above it; 0 when there is none.
+  KvfUnread::Kind unread{};  ///< What was not read.
+};
+
+/// "error", "warning", "note", "unread".
+std::string_view KindName(SetupFinding::Kind kind);
+
+/// What reading the file met, then the findings of the latest validation of all nodes, then what was not read.
+std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document);
+
+}  // namespace tervane
