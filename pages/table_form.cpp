@@ -35,7 +35,7 @@ std::string TableForm::Cell(int row, int column) const {
   CYbSEKvfBase* item = list_.GetItemNode(row);
   const TableColumn* shown = ColumnAt(column);
   if (!item || !shown) return {};
-  return shown->number ? ShownNumber(*shown->number(*item), UnitOf(*shown)) : shown->text(*item);
+  return shown->HasUnit() ? ShownNumber(*shown->number(*item), UnitOf(*shown)) : shown->text(*item);
 }
 
 std::string TableForm::Enter(int row, int column, const std::string& typed) {
@@ -43,7 +43,7 @@ std::string TableForm::Enter(int row, int column, const std::string& typed) {
   const TableColumn* target = ColumnAt(column);
   if (!item || !target) return "there is no such cell";
   if (IsReadOnly(row, column)) return "the cell cannot be changed";
-  return target->number ? EnterNumber(*target->number(*item), typed, UnitOf(*target)) : target->enter(*item, typed);
+  return target->HasUnit() ? EnterNumber(*target->number(*item), typed, UnitOf(*target)) : target->enter(*item, typed);
 }
 
 // ---- What a view asks
@@ -272,10 +272,12 @@ CellsResult TableForm::FillDown(const CellRange& cells) {
   for (int row = cells.firstRow + 1; row <= std::min(cells.lastRow, RowCount()); ++row) {
     for (int column = cells.firstColumn; column <= cells.lastColumn; ++column) {
       Put(result, row, column, ShownCell(cells.firstRow, column));
-      // The shown text of a converted number does not hold all of its digits.
       const TableColumn* target = ColumnAt(column);
-      if (target && target->number && !IsReadOnly(row, column))
-        *target->number(*list_.GetItemNode(row)) = *target->number(*source);
+      if (!target || !target->HasUnit() || IsReadOnly(row, column)) continue;
+      // The shown text of a converted number does not hold all of its digits.
+      double& number = *target->number(*list_.GetItemNode(row));
+      if (number != *target->number(*source)) result.hint |= kDataChanged;
+      number = *target->number(*source);
     }
   }
   return result;

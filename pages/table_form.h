@@ -50,6 +50,9 @@ struct TableColumn {
   std::string unit;                              ///< A fixed unit of the numbers, as of a control.
   int itemType = 0;                              ///< The numbers are quantities of that item type; 0 for none.
   std::function<double*(CYbSEKvfBase&)> number;  ///< The number of a cell, where the column holds numbers.
+
+  /// The numbers are shown and typed in a unit, which then goes before `text` and `enter`.
+  bool HasUnit() const { return number && (itemType != 0 || !unit.empty()); }
 };
 
 // A value in a cell: as it is shown, and typed. A value that the cell refuses is told and does not reach the item.
