@@ -120,7 +120,8 @@ class KvfArena {
   /// Uninitialised memory; `alignment` is a power of two.
   void* Allocate(std::size_t size, std::size_t alignment) {
     auto* start = reinterpret_cast<char*>((reinterpret_cast<std::uintptr_t>(next_) + alignment - 1) & ~(alignment - 1));
-    if (start == nullptr || size > static_cast<std::size_t>(end_ - start)) return AllocateChunk(size);
+    // Behind a chunk that is full to an odd byte the next aligned place lies beyond its end.
+    if (start == nullptr || start > end_ || size > static_cast<std::size_t>(end_ - start)) return AllocateChunk(size);
     next_ = start + size;
     return start;
   }

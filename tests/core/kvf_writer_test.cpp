@@ -51,6 +51,18 @@ TEST(KvfWriter, EveryNumberComesBackToTheSameBits) {
     ASSERT_EQ(bits32(kvfGetFloat(&ofFloats->params[i])), bits32(floats[i])) << i;
 }
 
+TEST(KvfWriter, TextsOfEveryLengthLeaveTheirNeighboursAlone) {
+  // Around the sizes of the memory's pieces, odd ones too, each with a node behind it.
+  for (const std::size_t size : {0, 1, 4095, 4096, 65'535, 100'000, 100'001, 1'048'577}) {
+    const Parsed built;
+    kvfAddTarget(built.File(), "T");
+    const std::string title(size, 'x');
+    kvfPutParam(built.File(), "Title", title);
+    kvfPutParam(built.File(), "Behind", 7);
+    EXPECT_EQ(built.Written(), "target T {\n  Title = \"" + title + "\"\n  Behind = 7\n}\n") << size;
+  }
+}
+
 TEST(KvfWriter, TheLocaleOfTheProcessHasNoSay) {
   struct CommaPunctuation : std::numpunct<char> {
     char do_decimal_point() const override { return ','; }
