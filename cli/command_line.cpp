@@ -47,7 +47,7 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
 
   CLI::App* create = withFile(
       command("new", "Write a setup with all defaults", [&] { return NewCommand(typed.file, typed.force, streams); }));
-  create->add_flag("--force", typed.force, "Replace a file that exists");
+  create->add_flag("--force", typed.force, "Replace a file that exists, also where an editor has it open");
 
   CLI::App* check = withFile(command("check", "List errors, warnings, notes and what the file holds that nothing reads",
                                      [&] { return CheckCommand(typed.file, typed.json, streams); }));
@@ -75,18 +75,20 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
            "The key, as SECTION/SECTION:KEY")
       ->required();
 
-  CLI::App* set = withFile(command("set", "Change the value of a key and save the setup",
-                                   [&] { return SetCommand(typed.file, typed.path, typed.value, streams); }));
+  CLI::App* set = withFile(command("set", "Change the value of a key and save the setup", [&] {
+    return SetCommand(typed.file, typed.path, typed.value, typed.force, streams);
+  }));
   withPath(set, "The key, as SECTION/SECTION:KEY")->required();
   set->add_option("VALUE", typed.value, "The value; several separated by commas; dates also as 2000-01-31 12:00")
       ->required();
+  set->add_flag("--force", typed.force, "Also where an editor has the setup open");
 
   CLI::App* convert = command("convert", "Write a setup of any version as one of the present version",
                               [&] { return ConvertCommand(typed.file, typed.secondFile, typed.force, streams); });
   convert->add_option("IN", typed.file, "The setup to read")->required();
   convert->add_option("OUT", typed.secondFile, "The setup to write; when it is IN, the original is kept beside it")
       ->required();
-  convert->add_flag("--force", typed.force, "Replace another file that exists");
+  convert->add_flag("--force", typed.force, "Replace another file that exists, also where an editor has it open");
 
   CLI::App* diff = command("diff", "Compare two setups by section and key",
                            [&] { return DiffCommand(typed.file, typed.secondFile, typed.json, streams); });

@@ -28,7 +28,7 @@ int ShowCommand(const std::string& file, const std::string& path, Streams stream
 int PageCommand(const std::string& file, const std::string& path, Streams streams);
 
 int GetCommand(const std::string& file, const std::string& path, Streams streams);
-int SetCommand(const std::string& file, const std::string& path, const std::string& value, Streams streams);
+int SetCommand(const std::string& file, const std::string& path, const std::string& value, bool force, Streams streams);
 
 int DiffCommand(const std::string& from, const std::string& to, bool json, Streams streams);
 int KeysCommand(bool markdown, Streams streams);

@@ -22,6 +22,7 @@ int Save(CFlowModelDoc& document, const std::string& file, Streams streams) {
 }
 
 bool RefuseToReplace(const std::string& file, bool force, Streams streams) {
+  if (RefuseHeld(file, force, streams)) return true;
   if (force || !FileExists(file)) return false;
   fmt::print(streams.err, "{} exists; choose another name, or add --force to replace it\n", file);
   return true;
@@ -40,7 +41,7 @@ int ConvertCommand(const std::string& in, const std::string& out, bool force, St
   if (!OpenSetup(document, in, streams)) return kCouldNot;
   // Converting a file in its place keeps the original beside it.
   const bool isInPlace = in == out || IsSameFile(in, out);
-  if (!isInPlace && RefuseToReplace(out, force, streams)) return kCouldNot;
+  if (isInPlace ? RefuseHeld(out, force, streams) : RefuseToReplace(out, force, streams)) return kCouldNot;
   TellReport(document, streams);
   return Save(document, out, streams);
 }

@@ -3,11 +3,13 @@
 #include "cli/setup_file.h"
 
 #include <algorithm>
+#include <optional>
 #include <vector>
 
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
+#include "document/setup_lock.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 
@@ -17,6 +19,14 @@ bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams
   if (document.OnOpenDocument(file)) return true;
   fmt::print(streams.err, "{}\n", document.Error());
   return false;
+}
+
+bool RefuseHeld(const std::string& file, bool force, Streams streams) {
+  const std::optional<LockHolder> holder = force ? std::nullopt : HolderOf(file);
+  if (holder)
+    fmt::print(streams.err, "{}: {}; close it there, or add --force to write it all the same\n", file,
+               HolderSentence(*holder));
+  return holder.has_value();
 }
 
 void TellReport(const CFlowModelDoc& document, Streams streams) {

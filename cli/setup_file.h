@@ -12,6 +12,9 @@ namespace tervane {
 /// Opens a setup; tells on the error stream why that failed.
 bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams);
 
+/// True, with a message, when an editor that runs has the setup open: its next save would undo what is written here.
+bool RefuseHeld(const std::string& file, bool force, Streams streams);
+
 /// Tells what the user should know of the loading, a line each; for commands that write or compare.
 void TellReport(const CFlowModelDoc& document, Streams streams);
 /// The same in one line, for commands that only show something.

@@ -83,7 +83,9 @@ std::string TakeValues(std::string_view value, KvfFile& file, KvfNode& key) {
 
 }  // namespace
 
-int SetCommand(const std::string& file, const std::string& typed, const std::string& value, Streams streams) {
+int SetCommand(const std::string& file, const std::string& typed, const std::string& value, bool force,
+               Streams streams) {
+  if (RefuseHeld(file, force, streams)) return kCouldNot;
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   TellReport(document, streams);

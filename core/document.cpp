@@ -72,6 +72,7 @@ bool CYbSEDocument::LoadTree(KvfFile* file, const std::string& path) {
     report_.entries.push_back(
         {LoadReport::Kind::Note, note.line, std::move(note.path), std::move(note.key), std::move(note.text)});
   report_.unread = CollectUnread(*file);
+  original_.path = path;
   original_.version = root_->ReadDocVersion();
   original_.mustBeKept = !report_.IsEmpty() || original_.version != CFlowModelDocVersionKvf::kWrittenVersion;
   OnLoaded();
@@ -95,14 +96,19 @@ bool CYbSEDocument::BuildText(const std::string& folder, std::string& text, std:
   return WriteKvfText(*built.file, text, error);
 }
 
+bool CYbSEDocument::IsOriginal(const std::string& path) const {
+  return FileExists(path) && (path == original_.path || IsSameFile(path, original_.path));
+}
+
 bool CYbSEDocument::KeepOriginal() {
+  const std::string& path = original_.path;
   const int version = original_.version;
-  const std::string folder(FolderOf(path_));
+  const std::string folder(FolderOf(path));
   const std::string stem = fmt::format("{}{}{}.v{}", folder, folder.empty() || EndsInSeparator(folder) ? "" : "/",
-                                       BaseNameOf(path_), version < 0 ? "none" : std::to_string(version));
-  std::string copy = fmt::format("{}{}", stem, ExtensionOf(path_));
-  for (int number = 2; FileExists(copy); ++number) copy = fmt::format("{}.{}{}", stem, number, ExtensionOf(path_));
-  if (const FileResult result = CopyToNewFile(path_, copy); !result.Ok()) {
+                                       BaseNameOf(path), version < 0 ? "none" : std::to_string(version));
+  std::string copy = fmt::format("{}{}", stem, ExtensionOf(path));
+  for (int number = 2; FileExists(copy); ++number) copy = fmt::format("{}.{}{}", stem, number, ExtensionOf(path));
+  if (const FileResult result = CopyToNewFile(path, copy); !result.Ok()) {
     error_ = fmt::format("the original could not be kept, so nothing was saved: {}", result.error);
     return false;
   }
@@ -117,7 +123,7 @@ bool CYbSEDocument::OnSaveDocument(const std::string& path) {
     error_ = fmt::format("cannot write {}: {}", path, reason);
     return false;
   }
-  const bool overwritesOriginal = original_.mustBeKept && (path == path_ || IsSameFile(path, path_));
+  const bool overwritesOriginal = original_.mustBeKept && IsOriginal(path);
   if (overwritesOriginal && !KeepOriginal()) return false;
   const FileResult result = WriteFileAtomically(path, text);
   if (!result.Ok()) {
@@ -125,7 +131,8 @@ bool CYbSEDocument::OnSaveDocument(const std::string& path) {
     return false;
   }
   if (!result.note.empty()) saveNotes_.push_back(result.note);
-  if (overwritesOriginal) original_.mustBeKept = false;
+  // Also where it was gone: what stands in its place now is this document's.
+  if (overwritesOriginal || path == original_.path) original_.mustBeKept = false;
   path_ = path;
   root_->SetSetupFolder(std::string(FolderOf(AbsoluteFromHere(path))));
   modified_ = false;

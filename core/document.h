@@ -57,6 +57,11 @@ class CYbSEDocument {
     header_ = other.header_;
     original_ = other.original_;
   }
+  /// From here on this is a setup that was never saved; the names of files in it keep their meaning.
+  void BecomeNew() {
+    path_.clear();
+    original_ = {};
+  }
   /// What the user should know of the latest save: where the original was kept, a hard link.
   const std::vector<std::string>& SaveNotes() const { return saveNotes_; }
 
@@ -81,6 +86,7 @@ class CYbSEDocument {
   bool LoadTree(KvfFile* file, const std::string& path);
   /// Copies the file that was read beside it; false when that failed.
   bool KeepOriginal();
+  bool IsOriginal(const std::string& path) const;
 
   std::unique_ptr<CYbSEKvfGlobalBase> root_;
   std::string path_;
@@ -93,6 +99,7 @@ class CYbSEDocument {
 
   /// The file that was read.
   struct Original {
+    std::string path;
     int version = -1;
     bool mustBeKept = false;  ///< It holds what the next save will not.
   };

@@ -350,6 +350,26 @@ FileResult CopyToNewFile(const std::string& from, const std::string& to) {
   return result;
 }
 
+std::string RealPath(const std::string& path) {
+  std::error_code error;
+  const fs::path absolute = fs::absolute(NativePath(path), error);
+  fs::path target = absolute;
+  if (error || FollowLinks(target)) return TextOfPath(absolute);
+  const fs::path folder = fs::canonical(HostFolderOf(target), error);
+  return TextOfPath(error ? target : folder / target.filename());
+}
+
+FileStamp StampOf(const std::string& path) {
+  FileStamp stamp;
+  std::error_code error;
+  const fs::path native = NativePath(path);
+  stamp.exists = fs::exists(native, error);
+  if (!stamp.exists) return stamp;
+  if (fs::is_regular_file(native, error)) stamp.size = fs::file_size(native, error);
+  stamp.time = fs::last_write_time(native, error);
+  return stamp;
+}
+
 bool FileExists(const std::string& path) {
   std::error_code error;
   const fs::file_type type = fs::symlink_status(NativePath(path), error).type();

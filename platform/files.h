@@ -5,6 +5,8 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
+#include <filesystem>
 #include <memory>
 #include <optional>
 #include <string>
@@ -43,6 +45,20 @@ FileResult WriteFileAtomically(const std::string& path, std::string_view content
 
 /// Copies a file to a name that does not exist yet (an existing file is an error), flushed like an atomic write.
 FileResult CopyToNewFile(const std::string& from, const std::string& to);
+
+/// The absolute path of the file itself, without symbolic links: the same for all names that lead to one file. Nothing
+/// needs to stand there yet.
+std::string RealPath(const std::string& path);
+
+/// A cheap sign: where two stamps of a path are equal, its file has hardly changed between.
+struct FileStamp {
+  bool exists = false;
+  std::uint64_t size = 0;
+  std::filesystem::file_time_type time;
+
+  bool operator==(const FileStamp&) const = default;
+};
+FileStamp StampOf(const std::string& path);
 
 /// True when something stands at the path (a broken link counts).
 bool FileExists(const std::string& path);

@@ -11,7 +11,8 @@
 #include <clocale>
 
 #include <windows.h>
-// Behind windows.h, on which it depends.
+// Behind windows.h, on which they depend.
+#include <lmcons.h>
 #include <psapi.h>
 
 #include "platform/paths.h"
@@ -23,13 +24,16 @@
 #include <cstring>
 #include <fstream>
 #include <memory>
+#include <sstream>
 #include <string_view>
 #include <vector>
 
 #include <cxxabi.h>
 #include <fcntl.h>
 #include <locale.h>
+#include <pwd.h>
 #include <signal.h>
+#include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
 #ifdef __linux__
@@ -121,7 +125,18 @@ File::Status File::GetStatus(std::error_code& error) const {
   status.isRegular = !error && !status.isFolder && GetFileType(handle_) == FILE_TYPE_DISK;
   status.size = (std::uint64_t{info.nFileSizeHigh} << 32) | info.nFileSizeLow;
   status.links = info.nNumberOfLinks;
+  status.volume = info.dwVolumeSerialNumber;
+  status.number = (std::uint64_t{info.nFileIndexHigh} << 32) | info.nFileIndexLow;
   return status;
+}
+
+bool File::TryLock(std::error_code& error) {
+  // One byte far behind the end, since nobody could read a locked one.
+  OVERLAPPED place{};
+  place.OffsetHigh = 0x7FFF'FFFF;
+  const bool done = LockFileEx(handle_, LOCKFILE_EXCLUSIVE_LOCK | LOCKFILE_FAIL_IMMEDIATELY, 0, 1, 0, &place);
+  SetError(done || GetLastError() == ERROR_LOCK_VIOLATION, error);
+  return done;
 }
 
 void File::TakeAttributesOf(const File& other, std::string&, std::error_code& error) {
@@ -178,6 +193,21 @@ bool IsProcessAlive(std::uint32_t processId) {
   const bool runs = WaitForSingleObject(process, 0) == WAIT_TIMEOUT;
   CloseHandle(process);
   return runs;
+}
+
+std::string ProcessStartTime(std::uint32_t processId) {
+  void* process = OpenProcess(PROCESS_QUERY_LIMITED_INFORMATION, FALSE, processId);
+  if (!process) return {};
+  FILETIME start{}, end{}, kernel{}, user{};
+  const bool done = GetProcessTimes(process, &start, &end, &kernel, &user);
+  CloseHandle(process);
+  return done ? std::to_string((std::uint64_t{start.dwHighDateTime} << 32) | start.dwLowDateTime) : std::string();
+}
+
+std::string UserName() {
+  wchar_t name[UNLEN + 1];
+  DWORD size = UNLEN + 1;
+  return GetUserNameW(name, &size) ? TextOfPath(std::wstring(name)) : std::string();
 }
 
 std::string HostName() {
@@ -351,7 +381,15 @@ File::Status File::GetStatus(std::error_code& error) const {
   struct stat info {};
   Checked(error, [&] { return fstat(descriptor_, &info); });
   if (error) return {};
-  return {S_ISREG(info.st_mode), S_ISDIR(info.st_mode), static_cast<std::uint64_t>(info.st_size), info.st_nlink};
+  return {S_ISREG(info.st_mode), S_ISDIR(info.st_mode), static_cast<std::uint64_t>(info.st_size),
+          info.st_nlink,         info.st_dev,           info.st_ino};
+}
+
+bool File::TryLock(std::error_code& error) {
+  Checked(error, [&] { return flock(descriptor_, LOCK_EX | LOCK_NB); });
+  if (error != std::errc::operation_would_block) return !error;
+  error.clear();
+  return false;
 }
 
 void File::TakeAttributesOf(const File& other, std::string& notKept, std::error_code& error) {
@@ -433,9 +471,34 @@ bool IsProcessAlive(std::uint32_t processId) {
   return kill(static_cast<pid_t>(processId), 0) == 0 || errno == EPERM;
 }
 
+std::string ProcessStartTime(std::uint32_t processId) {
+  std::ifstream file("/proc/" + std::to_string(processId) + "/stat");
+  std::string text;
+  std::getline(file, text, '\0');
+  // The second field is the program's name in parentheses, which may itself hold blanks and parentheses.
+  const std::size_t nameEnd = text.rfind(')');
+  if (nameEnd == std::string::npos) return {};
+  std::istringstream fields(text.substr(nameEnd + 1));
+  std::string field;
+  constexpr int kStartTime = 22;
+  for (int number = 3; number <= kStartTime; ++number) fields >> field;
+  // It counts from the start of the machine.
+  std::string boot;
+  std::ifstream("/proc/sys/kernel/random/boot_id") >> boot;
+  return fields ? field + " " + boot : std::string();
+}
+
 std::string HostName() {
   char name[256] = {};
   return gethostname(name, sizeof name - 1) == 0 ? name : "";
+}
+
+std::string UserName() {
+  std::vector<char> memory(16 * 1024);
+  passwd entry{};
+  passwd* found = nullptr;
+  if (getpwuid_r(geteuid(), &entry, memory.data(), memory.size(), &found) == 0 && found) return found->pw_name;
+  return std::to_string(geteuid());
 }
 
 std::uint64_t ResidentMemory() { return MemoryFromStatus("VmRSS:"); }

@@ -46,8 +46,15 @@ class File {
     bool isFolder = false;
     std::uint64_t size = 0;
     std::uint64_t links = 1;
+    /// Both together are the same for two open files exactly when these are one file.
+    std::uint64_t volume = 0;
+    std::uint64_t number = 0;
   };
   Status GetStatus(std::error_code& error) const;
+
+  /// Keeps every other open file of this one from the same, until this one is closed; also by the end of the process.
+  /// Never waits. `error` is set where the file system knows no such lock; false without an error when another has it.
+  bool TryLock(std::error_code& error);
 
   /// Gives this file the owner, group, permissions and extended attributes (access control lists among them) of
   /// `other`. Where the process or the file system may not, the name of what could not be kept is appended to
@@ -95,7 +102,12 @@ std::string DemangledName(const std::type_info& type);
 std::uint32_t ProcessId();
 /// True when a process with this number runs on this machine, also one of another user.
 bool IsProcessAlive(std::uint32_t processId);
+/// When that process of this machine started, in a form to be compared alone; also different after the machine started
+/// anew. Tells a process from a later one with the same number. Empty where unknown.
+std::string ProcessStartTime(std::uint32_t processId);
 std::string HostName();
+/// The name under which the user is known to the system; empty where unknown.
+std::string UserName();
 /// The size of the process's resident memory in bytes, and its peak; 0 where unknown.
 std::uint64_t ResidentMemory();
 std::uint64_t PeakResidentMemory();

@@ -115,6 +115,12 @@ std::optional<std::size_t> FirstInvalidUtf8(std::string_view text) {
   return std::nullopt;
 }
 
+std::uint64_t HashOf(std::string_view text) {
+  std::uint64_t hash = 14695981039346656037u;
+  for (const char c : text) hash = (hash ^ static_cast<unsigned char>(c)) * 1099511628211u;
+  return hash;
+}
+
 std::size_t EditDistance(std::string_view a, std::string_view b) {
   // One row of the table of distances between the beginnings of both texts.
   std::vector<std::size_t> row(b.size() + 1);

@@ -5,6 +5,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -26,6 +27,9 @@ std::string Replaced(std::string_view text, std::string_view from, std::string_v
 /// Place of the first byte that is no part of well-formed UTF-8 (overlong forms, surrogates and values above U+10FFFF
 /// are none), or nothing when the whole text is.
 std::optional<std::size_t> FirstInvalidUtf8(std::string_view text);
+
+/// FNV-1a over the bytes. Names of files are made of it, so it stays as it is.
+std::uint64_t HashOf(std::string_view text);
 
 /// Number of edits (insert, delete, replace one byte) that lead from one text to the other, for "did you mean".
 std::size_t EditDistance(std::string_view a, std::string_view b);

@@ -1,0 +1,37 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Who wrote a lock or an autosave, as lines that a person can read in the file.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace tervane {
+
+/// A running program: of a user, on a host, with a number that is told from later ones by the time of its start.
+struct EditorProcess {
+  std::string user;
+  std::string host;
+  std::uint32_t process = 0;
+  std::string started;
+
+  static EditorProcess This();
+  bool IsOnThisHost() const;
+  bool IsThis() const;
+  /// False when it runs no more; of another host nobody knows, and it counts as running.
+  bool MayRun() const;
+};
+
+/// A line "NAME: VALUE" with its line end; control characters of the value are written as %XX.
+std::string NamedLine(std::string_view name, std::string_view value);
+/// The value of the first line of that name, or nothing.
+std::optional<std::string> NamedValue(std::string_view lines, std::string_view name);
+
+/// The process as such lines, each name behind `prefix`; and back, nothing when host and process do not stand there.
+std::string ProcessLines(const EditorProcess& process, const std::string& prefix = {});
+std::optional<EditorProcess> ProcessOfLines(std::string_view lines, const std::string& prefix = {});
+
+}  // namespace tervane
