@@ -31,6 +31,7 @@ class CYbSEDlgBase {
   virtual ~CYbSEDlgBase() = default;
 
   CYbSEKvfBase& Node() const { return node_; }
+  Host& Outside() const { return context_.host; }
   /// Called once, before the page is shown the first time: makes the form.
   virtual void Initialize();
   /// Called when the page is shown and after every change: what the form's rules do not say themselves.
@@ -38,6 +39,9 @@ class CYbSEDlgBase {
   /// Makes the form and nothing else, for who only reads what a page holds.
   void MakeForm();
   PageForm& Form() const { return *form_; }
+
+  /// The help command. False when the page has no help of its own.
+  virtual bool OnHelp() { return false; }
 
   /// Types a value into a control. Gives what was expected when the control refuses it; the node is then unchanged.
   std::string Enter(Control& control, const std::string& typed);

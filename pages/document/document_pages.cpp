@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/document/document_pages.h"
 
+#include <fmt/format.h>
+
 #include "pages/document/help_pages.h"
 
 namespace tervane {
@@ -9,6 +11,16 @@ namespace tervane {
 std::string CTvnHelpView::PageName() const {
   const std::string& name = Node().GetHtml();
   return FindHelpPage(name) ? name : "default.htm";
+}
+
+bool CTvnHelpView::OnHelp() {
+  const std::string uri = Outside().Setting("HelpURI");
+  if (uri.empty()) return false;
+  const bool isIntroduction = Node().GetHtml() == "Tvn.htm";
+  Outside().OpenBrowser(fmt::format(
+      "{}2017/{}", uri,
+      isIntroduction ? "tervane/VORA_TVD_online/TVN_Getting_started/Introduction.htm" : "tervane/index.htm"));
+  return true;
 }
 
 void CTvnHelpView::Describe(PageForm& form) {

@@ -16,6 +16,8 @@ class CTvnHelpView : public PageOf<CYbSEKvfBase> {
   /// The name of the help page that is shown: the node's own, or "default.htm" where the program holds none of that
   /// name.
   std::string PageName() const;
+  /// Opens the online help, when the setting `HelpURI` says where it is.
+  bool OnHelp() override;
 
  protected:
   void Describe(PageForm& form) override;

@@ -1,0 +1,206 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What a user waits for at the desktop: the start, a page, a change, an undo. Run it with QT_QPA_PLATFORM=offscreen.
+// The peer of the start is a bare window of the toolkit in a process of its own, in the same run; the peer of a page is
+// a form of plain widgets of the toolkit.
+#include <QApplication>
+#include <QFormLayout>
+#include <QLineEdit>
+#include <QMainWindow>
+#include <QProcess>
+#include <QScrollArea>
+#include <QTemporaryDir>
+#include <algorithm>
+#include <chrono>
+#include <cstdlib>
+#include <string>
+#include <vector>
+
+#include <fmt/format.h>
+
+#include "bench/median_table.h"
+#include "document/edit_session.h"
+#include "pages/tree_entries.h"
+#include "platform/files.h"
+#include "platform/os.h"
+#include "shell/document_frame.h"
+#include "shell/main_window.h"
+#include "shell/program.h"
+#include "shell/qt_text.h"
+#include "shell/theme.h"
+#include "simspec/extra_params.h"
+#include "simspec/titles.h"
+
+namespace tervane::bench {
+
+namespace {
+
+constexpr int kRepetitions = 10;
+
+double Milliseconds(const std::function<void()>& measured) {
+  const auto start = std::chrono::steady_clock::now();
+  measured();
+  return std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - start).count();
+}
+
+double Median(std::vector<double> times) {
+  std::ranges::sort(times);
+  return times[times.size() / 2];
+}
+
+double MedianOf(const std::function<void()>& measured) {
+  std::vector<double> times;
+  for (int i = 0; i < kRepetitions; ++i) times.push_back(Milliseconds(measured));
+  return Median(times);
+}
+
+void Tell(const std::string& what, double figure, double limit, const char* unit) {
+  fmt::print("{:<64} {:>8.1f} {:<2}  limit {:>4.0f}  {}\n", what, figure, unit, limit, Verdict(figure, limit));
+}
+
+void TellPeer(const std::string& what, double figure, const char* unit) {
+  fmt::print("{:<64} {:>8.1f} {}\n", what, figure, unit);
+}
+
+/// Layouts and drawing are part of what a user waits for.
+void Settle(QWidget& window) {
+  QApplication::processEvents();
+  window.grab();
+}
+
+std::string SetupWithItems(int count) {
+  CFlowModelDoc setup;
+  std::string text, error;
+  if (count > 0) setup.Root().Child<CExtraParamsKvf>()->SetItemCount(count, 1);
+  if (!setup.BuildText("/setups", text, error)) fmt::print("not saved: {}\n", error);
+  return text;
+}
+
+// ---- Starts
+
+int ShowBareWindow(int argc, char** argv) {
+  QApplication application(argc, argv);
+  QMainWindow window;
+  window.resize(1280, 800);
+  window.show();
+  QApplication::processEvents();
+  return window.grab().save(argv[2]) ? 0 : 1;
+}
+
+double StartOf(const QString& program, const QStringList& arguments) {
+  return MedianOf([&] {
+    QProcess process;
+    process.setStandardErrorFile(QProcess::nullDevice());
+    process.start(program, arguments);
+    process.waitForFinished();
+    if (process.exitCode() != 0) fmt::print("{} failed\n", FromQt(program));
+  });
+}
+
+// ---- Pages and changes
+
+/// A page of plain widgets, as many as the longest of ours.
+void ShowPlainForm(QMainWindow& window) {
+  auto* scroll = new QScrollArea;
+  auto* content = new QWidget;
+  auto* form = new QFormLayout(content);
+  for (int i = 0; i < 20; ++i)
+    form->addRow(QString("Maximum head change per iteration %1").arg(i), new QLineEdit("0.005"));
+  scroll->setWidget(content);
+  scroll->setWidgetResizable(true);
+  window.setCentralWidget(scroll);
+  Settle(window);
+}
+
+void MeasurePages(MainWindow& window) {
+  DocumentFrame& frame = *window.Frame();
+  std::vector<double> times;
+  for (const TreeEntry& entry : TreeEntries(frame.Session().Document().Root(), kSetupDataTree)) {
+    std::vector<double> ofPage;
+    for (int i = 0; i < kRepetitions; ++i) {
+      frame.GoToPath(i % 2 == 0 ? "SimSpec/SimTitle" : "ExtraParams");
+      Settle(window);
+      ofPage.push_back(Milliseconds([&] {
+        frame.GoTo(entry.node->Serial());
+        Settle(window);
+      }));
+    }
+    times.push_back(Median(ofPage));
+  }
+  Tell("select a node until its page is drawn, median of all pages", Median(times), 30, "ms");
+  Tell("the same, slowest page", *std::ranges::max_element(times), 100, "ms");
+  QMainWindow plain;
+  plain.resize(window.size());
+  plain.show();
+  TellPeer("  peer: a form of 20 plain fields", MedianOf([&] { ShowPlainForm(plain); }), "ms");
+}
+
+void MeasureChanges(MainWindow& window, const std::string& setup, double limit) {
+  DocumentFrame& frame = *window.Frame();
+  frame.GoToPath("SimSpec/SimTitle");
+  Settle(window);
+  auto& title = *frame.Session().Document().Root().GetImportantNode("BASICPARAMETERS")->Child<CSimTitleKvf>();
+  int number = 0;
+  const auto change = [&] {
+    title.Title = std::to_string(++number);
+    frame.Change(title, 1, QString("Change %1").arg(number));
+    Settle(window);
+  };
+  change();
+  Tell(fmt::format("change a value until all views show it, {}", setup), MedianOf(change), limit, "ms");
+  Tell(fmt::format("undo of one change, {}", setup), MedianOf([&] {
+         frame.Undo();
+         Settle(window);
+       }),
+       30, "ms");
+}
+
+void Measure(const QString& self) {
+  const QTemporaryDir folder;
+  Program program(folder.filePath("settings.ini"));
+  const QString few = folder.filePath("default.tvd"), many = folder.filePath("many.tvd");
+  WriteFileAtomically(FromQt(few), SetupWithItems(0));
+  WriteFileAtomically(FromQt(many), SetupWithItems(10'000));
+  const QString picture = folder.filePath("picture.png");
+
+  const QString quarzel = QString::fromUtf8(TERVANE_BIN_DIR "/quarzel");
+  StartOf(quarzel, {few, "--screenshot", picture});  // warm
+  Tell("start of the process until the picture of its window is saved",
+       StartOf(quarzel, {few, "--screenshot", picture}), 400, "ms");
+  TellPeer("  peer: a bare window of the toolkit", StartOf(self, {"--bare-window", picture}), "ms");
+  {
+    MainWindow window(program);
+    window.resize(1280, 800);
+    window.show();
+    window.OpenDocument(few);
+    Settle(window);
+    Tell("resident memory with one default setup", static_cast<double>(os::ResidentMemory()) / (1 << 20), 120, "MB");
+    MeasurePages(window);
+    MeasureChanges(window, "default setup", 16);
+  }
+  MainWindow window(program);
+  window.resize(1280, 800);
+  window.show();
+  window.OpenDocument(many);
+  MeasureChanges(window, "10,000 items", 50);
+  window.Frame()->GoToPath("ExtraParams");
+  Settle(window);
+  TellPeer("select the page of 10,000 rows", MedianOf([&] {
+             window.Frame()->GoToPath("SimSpec/SimTitle");
+             window.Frame()->GoToPath("ExtraParams");
+             Settle(window);
+           }),
+           "ms");
+}
+
+}  // namespace
+
+}  // namespace tervane::bench
+
+int main(int argc, char** argv) {
+  if (argc == 3 && std::string(argv[1]) == "--bare-window") return tervane::bench::ShowBareWindow(argc, argv);
+  QApplication application(argc, argv);
+  const tervane::Theme theme;
+  tervane::bench::Measure(QString::fromLocal8Bit(argv[0]));
+}

@@ -1,0 +1,377 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/document_frame.h"
+
+#include <QApplication>
+#include <QDataStream>
+#include <QFileInfo>
+#include <QIODevice>
+#include <QSplitter>
+#include <QTabWidget>
+#include <QVBoxLayout>
+#include <algorithm>
+
+#include "core/path.h"
+#include "document/view_settings.h"
+#include "pages/findings.h"
+#include "pages/page.h"
+#include "pages/tree_entries.h"
+#include "shell/find_panel.h"
+#include "shell/findings_view.h"
+#include "shell/log_view.h"
+#include "shell/node_tree.h"
+#include "shell/page_view.h"
+#include "shell/program.h"
+#include "shell/qt_host.h"
+#include "shell/qt_text.h"
+#include "shell/theme.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr int kTreeWidth = 250, kPageWidth = 750, kPageHeight = 480, kBottomHeight = 110;
+constexpr int kAutosaveDelay = 2000;  ///< Milliseconds after the last change.
+constexpr int kDiskInterval = 3000;   ///< Milliseconds between looks at the file on disk.
+constexpr std::size_t kMostVisited = 200;
+
+CYbSEKvfBase* NodeBelow(CYbSEKvfBase& node, std::uint64_t serial) {
+  if (node.Serial() == serial) return &node;
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+    if (CYbSEKvfBase* found = NodeBelow(*child, serial)) return found;
+  return nullptr;
+}
+
+}  // namespace
+
+DocumentFrame::DocumentFrame(std::unique_ptr<EditSession> session, const QString& name, QtHost& host, Program& program)
+    : session_(std::move(session)), name_(name), host_(host), program_(program) {
+  all_ = new QVBoxLayout(this);
+  all_->setContentsMargins(0, 0, 0, 0);
+  all_->setSpacing(0);
+  BuildBody();
+  session_->Listen([this](int hint) { Refresh(hint); });
+  autosave_.setSingleShot(true);
+  connect(&autosave_, &QTimer::timeout, this, &DocumentFrame::RunAutosave);
+  connect(&disk_, &QTimer::timeout, this, &DocumentFrame::CheckDisk);
+  disk_.start(kDiskInterval);
+
+  Refresh(kDataChanged);
+  if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));
+  if (session_->IsReadOnly())
+    ShowBanner(ToQt(session_->ReadOnlyReason()), {{tr("Save &As…"), [this] { emit SaveAsWanted(); }}});
+  TellReport();
+}
+
+DocumentFrame::~DocumentFrame() {
+  // Pages speak of nodes: they go before the document does.
+  delete columns_;
+}
+
+void DocumentFrame::BuildBody() {
+  const Theme& theme = Theme::Get();
+  treeTabs_ = new QTabWidget;
+  treeTabs_->setDocumentMode(true);
+  const auto tree = [&](int id, const QString& title, const QString& emptyText) {
+    auto* made = new NodeTree(id, emptyText);
+    treeTabs_->addTab(made, title);
+    trees_.push_back(made);
+    connect(made, &NodeTree::NodeChosen, this, [this](quint64 serial) { GoTo(serial); });
+  };
+  trees_.clear();
+  tree(kSetupDataTree, tr("Setup Data"), tr("No part of the setup takes part."));
+  tree(kProcessedDataTree, tr("Processed Data"),
+       tr("Nothing yet: the preprocessor has left no report beside this setup."));
+  tree(kResultsTree, tr("Results"), tr("Nothing yet: no simulation has left results for this setup."));
+  find_ = new FindPanel(session_->Document(), treeTabs_);
+  connect(find_, &FindPanel::HitChosen, this,
+          [this](quint64 serial, const QString& control) { GoTo(serial, FromQt(control)); });
+  connect(find_, &FindPanel::Left, this, [this] { treeTabs_->currentWidget()->setFocus(); });
+
+  pagePlace_ = new QWidget;
+  auto* place = new QVBoxLayout(pagePlace_);
+  place->setContentsMargins(0, 0, 0, 0);
+
+  bottomTabs_ = new QTabWidget;
+  bottomTabs_->setDocumentMode(true);
+  findings_ = new FindingsView;
+  connect(findings_, &FindingsView::FindingChosen, this,
+          [this](const SetupFinding& finding) { GoTo(finding.serial, finding.key); });
+  bottomTabs_->addTab(findings_, tr("Findings"));
+  log_ = new LogView(tr("What happens to this document, and what an engine that runs it says, stands here."));
+  bottomTabs_->addTab(log_, tr("Execution Log"));
+  bottomTabs_->addTab(new LogView(tr("What the river engine says during a run stands here.")),
+                      tr("Fluvane Execution Log"));
+
+  rows_ = new QSplitter(Qt::Vertical);
+  rows_->addWidget(pagePlace_);
+  rows_->addWidget(bottomTabs_);
+  rows_->setStretchFactor(0, 1);
+  rows_->setSizes({theme.Scaled(kPageHeight), theme.Scaled(kBottomHeight)});
+  rows_->setChildrenCollapsible(false);
+  columns_ = new QSplitter(Qt::Horizontal);
+  columns_->addWidget(find_);
+  columns_->addWidget(rows_);
+  columns_->setStretchFactor(1, 1);
+  columns_->setSizes({theme.Scaled(kTreeWidth + 30), theme.Scaled(kPageWidth)});
+  columns_->setChildrenCollapsible(false);
+  all_->addWidget(columns_, 1);
+}
+
+void DocumentFrame::Redraw() {
+  Commit();
+  const QByteArray layout = SaveLayout();
+  const QString log = log_->toPlainText();
+  const std::uint64_t current = current_;
+  const int tab = treeTabs_->currentIndex(), bottom = bottomTabs_->currentIndex();
+  delete columns_;
+  current_ = 0;
+  BuildBody();
+  RestoreLayout(layout);
+  log_->setPlainText(log);
+  treeTabs_->setCurrentIndex(tab);
+  bottomTabs_->setCurrentIndex(bottom);
+  Refresh(kDataChanged);
+  isGoing_ = true;
+  GoTo(current);
+  isGoing_ = false;
+}
+
+QString DocumentFrame::Name() const {
+  return session_->Path().empty() ? name_ : QFileInfo(ToQt(session_->Path())).fileName();
+}
+
+QString DocumentFrame::Title() const {
+  QString title = Name();
+  if (session_->IsReadOnly()) title += tr(" (read-only)");
+  return session_->IsModified() ? title + " *" : title;
+}
+
+// ---- The place that is shown
+
+CYbSEKvfBase* DocumentFrame::NodeOf(std::uint64_t serial) const {
+  return serial ? NodeBelow(session_->Document().Root(), serial) : nullptr;
+}
+
+bool DocumentFrame::GoTo(std::uint64_t serial, const std::string& control) {
+  CYbSEKvfBase* node = NodeOf(serial);
+  // A node without a page shows on the page of a node above it.
+  while (node && !PageClassOf(*node)) node = node->GetParent();
+  if (!node) return false;
+  if (node->Serial() != current_ || !page_) {
+    Commit();
+    ShowPage(*node, control);
+  } else if (!control.empty()) {
+    page_->FocusOn(control);
+  }
+  return true;
+}
+
+bool DocumentFrame::GoToPath(const std::string& path) {
+  const SetupPath parsed = ParseSetupPath(path);
+  const CYbSEKvfBase* node = FindNode(session_->Document().Root(), parsed.steps);
+  return node && node->GetParent() && GoTo(node->Serial(), parsed.key.name);
+}
+
+void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
+  const PageClass* pageClass = PageClassOf(node);
+  PageContext context{session_->Document(), host_,
+                      [this, &node](int hint, const std::string& action, const void* source) {
+                        session_->UpdateDoc(node, hint, action, source);
+                      },
+                      &program_.Units()};
+  auto made = MakePage(*pageClass, node, std::move(context));
+  if (!made) return;
+  node.Touch();
+  if (page_) {
+    // What the user did in it may have led here: its own code is still to return to.
+    page_->hide();
+    page_->deleteLater();
+  }
+  page_ = new PageView(std::move(made), ToQt(PathOf(node)));
+  connect(page_, &PageView::UnitChosen, this, [this](int itemType, int unit) {
+    program_.ChooseUnit(itemType, unit);
+    page_->Sync();
+  });
+  pagePlace_->layout()->addWidget(page_);
+  current_ = node.Serial();
+  above_.clear();
+  for (const CYbSEKvfBase* parent = node.GetParent(); parent; parent = parent->GetParent())
+    above_.push_back(parent->Serial());
+  SelectInTrees(current_);
+  if (!isGoing_) Remember(current_);
+  if (!control.empty()) page_->FocusOn(control);
+  emit StateChanged();
+}
+
+bool DocumentFrame::SelectInTrees(std::uint64_t serial) {
+  NodeTree* shown = nullptr;
+  for (NodeTree* tree : trees_)
+    if (tree->Select(serial) && (!shown || tree == treeTabs_->currentWidget())) shown = tree;
+  if (shown) treeTabs_->setCurrentWidget(shown);
+  return shown != nullptr;
+}
+
+void DocumentFrame::Remember(std::uint64_t serial) {
+  visited_.resize(static_cast<std::size_t>(place_ + 1));
+  if (visited_.empty() || visited_.back() != serial) visited_.push_back(serial);
+  if (visited_.size() > kMostVisited) visited_.erase(visited_.begin());
+  place_ = static_cast<std::ptrdiff_t>(visited_.size()) - 1;
+}
+
+bool DocumentFrame::CanGo(int by) const {
+  const std::ptrdiff_t to = place_ + by;
+  return to >= 0 && to < static_cast<std::ptrdiff_t>(visited_.size());
+}
+
+void DocumentFrame::Go(int by) {
+  isGoing_ = true;
+  // Nodes that are no more are passed over.
+  while (CanGo(by)) {
+    place_ += by;
+    if (GoTo(visited_[static_cast<std::size_t>(place_)])) break;
+  }
+  isGoing_ = false;
+  emit StateChanged();
+}
+
+std::string DocumentFrame::CurrentPath() const {
+  const CYbSEKvfBase* node = NodeOf(current_);
+  return node ? PathOf(*node) : std::string();
+}
+
+void DocumentFrame::LeaveGoneNode() {
+  if (!current_ || SelectInTrees(current_)) return;
+  CYbSEKvfBase* node = NodeOf(current_);
+  if (node && node->IsDlgUsedInSetup() == 0 && session_->Document().Root().GetImportantNode("OVERVIEW") == node) return;
+  for (const std::uint64_t serial : std::vector(above_))
+    if (trees_.front()->Select(serial) && GoTo(serial)) return;
+  if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));
+}
+
+void DocumentFrame::StartFind() { find_->Start(); }
+
+bool DocumentFrame::OnHelp() { return page_ && page_->Page().OnHelp(); }
+
+void DocumentFrame::StepFinding(int by) {
+  bottomTabs_->setCurrentWidget(findings_);
+  findings_->Step(by);
+}
+
+void DocumentFrame::FocusNextPane() {
+  const QWidget* focus = QApplication::focusWidget();
+  const auto holds = [focus](const QWidget* pane) { return focus && (pane == focus || pane->isAncestorOf(focus)); };
+  if (holds(find_) && page_)
+    page_->FocusOn({});
+  else if (holds(pagePlace_))
+    bottomTabs_->currentWidget()->setFocus();
+  else
+    treeTabs_->currentWidget()->setFocus();
+}
+
+// ---- Editing
+
+void DocumentFrame::Refresh(int hint) {
+  CGlobal& root = session_->Document().Global();
+  const auto* settings = root.Important<CViewSettingsKvf>("VIEWSETTINGS");
+  for (NodeTree* tree : trees_) tree->Sync(root, !settings || settings->ShowValidationIcons != 0);
+  findings_->Show(FindingsOf(session_->Document()));
+  const int count = findings_->Count();
+  bottomTabs_->setTabText(bottomTabs_->indexOf(findings_), count ? tr("Findings (%1)").arg(count) : tr("Findings"));
+  if (page_) LeaveGoneNode();
+  if (page_) page_->Sync();
+  if (hint & ~(kDataChanged | kRefreshPlots)) find_->Forget();
+  if (session_->NeedsAutosave()) autosave_.start(kAutosaveDelay);
+  emit StateChanged();
+}
+
+void DocumentFrame::Commit() {
+  if (page_) page_->Commit();
+}
+
+void DocumentFrame::Undo() {
+  Commit();
+  session_->Undo();
+}
+
+void DocumentFrame::Redo() {
+  Commit();
+  session_->Redo();
+}
+
+void DocumentFrame::Change(CYbSEKvfBase& node, int hint, const QString& action) {
+  session_->UpdateDoc(node, hint, FromQt(action));
+}
+
+bool DocumentFrame::Save(const std::string& path) {
+  Commit();
+  if (!session_->SaveAs(path)) {
+    Log(tr("Not saved: %1").arg(ToQt(session_->Error())));
+    host_.Tell(session_->Error(), Host::Icon::Error);
+    return false;
+  }
+  Log(tr("Saved as %1").arg(ToQt(path)));
+  for (const std::string& note : session_->Document().SaveNotes()) Log(ToQt(note));
+  if (diskBanner_) diskBanner_->deleteLater();
+  program_.AddRecentFile(ToQt(path));
+  Refresh(kDataChanged);
+  return true;
+}
+
+void DocumentFrame::ShowBanner(const QString& text, const std::vector<Banner::Answer>& answers) {
+  all_->insertWidget(0, new Banner(text, answers));
+}
+
+void DocumentFrame::TellReport() {
+  const LoadReport& report = session_->Document().Report();
+  for (const LoadReport::Entry& entry : report.entries)
+    if (entry.kind == LoadReport::Kind::Warning) host_.Tell(entry.text, Host::Icon::Warning);
+  if (report.unread.empty()) return;
+  ShowBanner(
+      tr("This file holds %n thing(s) that the editor does not know. They are listed below; the first save keeps "
+         "the file as it was beside the new one.",
+         nullptr, static_cast<int>(report.unread.size())),
+      {{tr("&What will be saved…"), [this] { emit ChangesWanted(); }}});
+}
+
+void DocumentFrame::CheckDisk() {
+  if (diskBanner_ || session_->Path().empty()) return;
+  const EditSession::OnDisk state = session_->CheckDisk();
+  if (state == EditSession::OnDisk::AsKnown) return;
+  const bool isGone = state == EditSession::OnDisk::Gone;
+  std::vector<Banner::Answer> answers;
+  if (!isGone) {
+    answers.push_back({tr("&Reload"), [this] { emit ReloadWanted(); }});
+    answers.push_back({tr("&Differences…"), [this] { emit ChangesWanted(); }});
+  }
+  answers.push_back({tr("&Keep Mine"), [this] { session_->AcceptDisk(); }});
+  diskBanner_ = new Banner(isGone ? tr("The file is no more on disk. A save writes it anew.")
+                                  : tr("Another program has changed the file on disk."),
+                           answers);
+  all_->insertWidget(0, diskBanner_);
+}
+
+void DocumentFrame::RunAutosave() {
+  if (!session_->NeedsAutosave()) return;
+  if (const std::string trouble = session_->Autosave(); !trouble.empty())
+    Log(tr("The changes could not be kept for a recovery: %1").arg(ToQt(trouble)));
+}
+
+void DocumentFrame::Log(const QString& line) { log_->Add(line); }
+
+QByteArray DocumentFrame::SaveLayout() const {
+  QByteArray layout;
+  QDataStream stream(&layout, QIODevice::WriteOnly);
+  stream << columns_->saveState() << rows_->saveState();
+  return layout;
+}
+
+void DocumentFrame::RestoreLayout(const QByteArray& layout) {
+  QByteArray columns, rows;
+  QDataStream stream(layout);
+  stream >> columns >> rows;
+  if (!columns.isEmpty()) columns_->restoreState(columns);
+  if (!rows.isEmpty()) rows_->restoreState(rows);
+}
+
+}  // namespace tervane

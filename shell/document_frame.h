@@ -1,0 +1,127 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <QPointer>
+#include <QTimer>
+#include <QWidget>
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "document/edit_session.h"
+#include "shell/banner.h"
+
+class QSplitter;
+class QTabWidget;
+class QVBoxLayout;
+
+namespace tervane {
+
+class FindPanel;
+class FindingsView;
+class LogView;
+class NodeTree;
+class PageView;
+class Program;
+class QtHost;
+
+/// One document in its tab: the trees at the left, the page in the middle, findings and logs below.
+class DocumentFrame : public QWidget {
+  Q_OBJECT
+
+ public:
+  /// `name` is how a setup is called that was never saved.
+  DocumentFrame(std::unique_ptr<EditSession> session, const QString& name, QtHost& host, Program& program);
+  ~DocumentFrame() override;
+
+  EditSession& Session() const { return *session_; }
+  /// The name of the file, with a star when there are changes to save.
+  QString Title() const;
+  QString Name() const;
+
+  // ---- The place that is shown
+
+  /// Shows a node's page, with the keyboard on the control of that key or label; false when it has no page.
+  bool GoTo(std::uint64_t serial, const std::string& control = {});
+  bool GoToPath(const std::string& path);
+  bool CanGo(int by) const;
+  /// Goes back (-1) or forward (1) among the visited nodes.
+  void Go(int by);
+  /// The path of the node that is shown; empty where there is none.
+  std::string CurrentPath() const;
+  void StartFind();
+  /// The page's own help; false when it has none.
+  bool OnHelp();
+  void StepFinding(int by);
+  /// Puts the keyboard into the next of: tree, page, findings.
+  void FocusNextPane();
+
+  // ---- Editing
+
+  /// Hands over what was typed and not yet entered; to be called before every command.
+  void Commit();
+  void Undo();
+  void Redo();
+  /// A change that a menu makes in a node that has no page.
+  void Change(CYbSEKvfBase& node, int hint, const QString& action);
+  /// False when it failed; the user has been told why.
+  bool Save(const std::string& path);
+
+  void ShowBanner(const QString& text, const std::vector<Banner::Answer>& answers);
+  void CheckDisk();
+  void Log(const QString& line);
+  /// Makes all anew that was computed from colours and sizes.
+  void Redraw();
+
+  QByteArray SaveLayout() const;
+  void RestoreLayout(const QByteArray& layout);
+
+ signals:
+  /// The title, the place, or what can be undone is another one.
+  void StateChanged();
+  void SaveAsWanted();
+  void ReloadWanted();
+  void ChangesWanted();
+
+ private:
+  void BuildBody();
+  void Refresh(int hint);
+  void ShowPage(CYbSEKvfBase& node, const std::string& control);
+  void Remember(std::uint64_t serial);
+  /// Selects the node's entry, preferably in the tree that is shown; false when no tree has one.
+  bool SelectInTrees(std::uint64_t serial);
+  CYbSEKvfBase* NodeOf(std::uint64_t serial) const;
+  /// When the node that is shown has left the setup: the nearest above it that is still there.
+  void LeaveGoneNode();
+  void RunAutosave();
+  void TellReport();
+
+  std::unique_ptr<EditSession> session_;
+  QString name_;
+  QtHost& host_;
+  Program& program_;
+
+  QVBoxLayout* all_;
+  QSplitter* columns_ = nullptr;
+  QSplitter* rows_ = nullptr;
+  QTabWidget* treeTabs_ = nullptr;
+  QTabWidget* bottomTabs_ = nullptr;
+  std::vector<NodeTree*> trees_;
+  FindPanel* find_ = nullptr;
+  FindingsView* findings_ = nullptr;
+  LogView* log_ = nullptr;
+  QWidget* pagePlace_ = nullptr;
+  QPointer<PageView> page_;
+  QPointer<Banner> diskBanner_;
+
+  std::uint64_t current_ = 0;
+  std::vector<std::uint64_t> above_;    ///< The nodes above the one that is shown, nearest first.
+  std::vector<std::uint64_t> visited_;  ///< For going back and forward.
+  std::ptrdiff_t place_ = -1;           ///< Of the shown node in `visited_`.
+  bool isGoing_ = false;
+  QTimer autosave_, disk_;
+};
+
+}  // namespace tervane

@@ -1,0 +1,99 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <QApplication>
+#include <QDir>
+#include <QTemporaryDir>
+#include <QTimer>
+#include <QTranslator>
+#include <cstdio>
+#include <string>
+#include <vector>
+
+#include <CLI/CLI.hpp>
+
+#include "platform/os.h"
+#include "shell/document_frame.h"
+#include "shell/main_window.h"
+#include "shell/program.h"
+#include "shell/qt_text.h"
+#include "shell/theme.h"
+
+namespace {
+
+using namespace tervane;
+
+struct Typed {
+  std::vector<std::string> files;
+  std::string page, size, screenshot, appearance;
+  double zoom = 0;
+};
+
+/// "1280x800"
+QSize ParseSize(const std::string& text) {
+  int width = 0, height = 0;
+  char rest = 0;
+  const bool isSize = std::sscanf(text.c_str(), "%dx%d%c", &width, &height, &rest) == 2;
+  return isSize && width > 0 && height > 0 && width <= 20000 && height <= 20000 ? QSize(width, height) : QSize();
+}
+
+int Run(const Typed& typed, QApplication& application) {
+  // A picture shows the program as it is for everybody, and leaves nothing in the user's settings.
+  const bool isPicture = !typed.screenshot.empty();
+  QTemporaryDir pictureFolder;
+  Program program(isPicture ? pictureFolder.filePath("settings.ini") : QString());
+  Theme theme;
+  if (const int appearance = program.Settings().value("Appearance", 0).toInt(); appearance > 0 && appearance <= 2)
+    theme.SetAppearance(static_cast<Theme::Appearance>(appearance));
+  if (!typed.appearance.empty())
+    theme.SetAppearance(typed.appearance == "dark" ? Theme::Appearance::Dark : Theme::Appearance::Light);
+  theme.SetZoom(typed.zoom > 0 ? typed.zoom : program.Settings().value("Zoom", 1.0).toDouble());
+
+  MainWindow window(program);
+  if (!typed.size.empty()) window.resize(ParseSize(typed.size));
+  window.show();
+  for (const std::string& file : typed.files)
+    if (!window.OpenDocument(ToQt(file)) && isPicture) return 2;
+  if (!typed.page.empty() && (!window.Frame() || !window.Frame()->GoToPath(typed.page))) {
+    std::fprintf(stderr, "quarzel: %s: there is no page of that path\n", typed.page.c_str());
+    if (isPicture) return 2;
+  }
+  if (!isPicture) {
+    QTimer::singleShot(0, &window, [&window] { window.OfferRecoveries(); });
+    return QApplication::exec();
+  }
+  // Layouts settle when events have run.
+  for (int i = 0; i < 3; ++i) application.processEvents();
+  if (!window.grab().save(ToQt(typed.screenshot))) {
+    std::fprintf(stderr, "quarzel: %s cannot be written\n", typed.screenshot.c_str());
+    return 2;
+  }
+  return 0;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  os::PrepareProcess();
+  CLI::App commandLine{"The setup editor of the integrated catchment model Tervane.", "quarzel"};
+  Typed typed;
+  commandLine.add_option("FILE", typed.files, "Setups (.tvd) to open");
+  commandLine.add_option("--page", typed.page, "The node to show, as Climate/PrecipitationRate");
+  commandLine.add_option("--zoom", typed.zoom, "The size of everything, 1.5 for half as large again")
+      ->check(CLI::Range(0.5, 3.0));
+  commandLine.add_option("--size", typed.size, "The size of the window, as 1280x800")
+      ->check([](const std::string& text) {
+        return ParseSize(text).isValid() ? std::string() : "a size as 1280x800 was expected";
+      });
+  commandLine.add_option("--appearance", typed.appearance, "light or dark")->check(CLI::IsMember({"light", "dark"}));
+  commandLine.add_option("--screenshot", typed.screenshot, "Draw the window into this picture and end");
+  commandLine.set_version_flag("--version", "quarzel 0.1.0");
+  CLI11_PARSE(commandLine, argc, argv);
+
+  QApplication application(argc, argv);
+  QApplication::setApplicationName("Quarzel");
+  QApplication::setApplicationVersion("0.1.0");
+  QTranslator translator;
+  if (translator.load(QLocale(), "quarzel", "_", QApplication::applicationDirPath() + "/translations"))
+    QApplication::installTranslator(&translator);
+  return Run(typed, application);
+}

@@ -1,0 +1,349 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The commands of the window: where they stand, when they can be given, and what they do.
+#include <QActionGroup>
+#include <QApplication>
+#include <QClipboard>
+#include <QFileInfo>
+#include <QLabel>
+#include <QMenuBar>
+#include <QMessageBox>
+#include <QStackedWidget>
+#include <QStatusBar>
+#include <QTabWidget>
+#include <QToolBar>
+
+#include "document/edit_session.h"
+#include "document/module.h"
+#include "document/view_settings.h"
+#include "execution/execute_flags.h"
+#include "shell/document_frame.h"
+#include "shell/main_window.h"
+#include "shell/program.h"
+#include "shell/qt_text.h"
+#include "shell/table_view.h"
+#include "shell/theme.h"
+#include "shell/welcome_page.h"
+#include "simspec/model_components.h"
+
+namespace tervane {
+
+namespace {
+
+CExecuteEngineFlagsKvf& FlagsOf(const DocumentFrame& frame) {
+  return *frame.Session().Document().Root().Important<CExecuteEngineFlagsKvf>("EXECUTE_ENGINE_FLAGS");
+}
+
+CViewSettingsKvf& ViewSettingsOf(const DocumentFrame& frame) {
+  return *frame.Session().Document().Root().Important<CViewSettingsKvf>("VIEWSETTINGS");
+}
+
+bool HasWaterQuality(const DocumentFrame& frame) {
+  const auto* components = frame.Session().Document().Root().Important<CModelCompKvf>("MODELCOMP");
+  return components && components->WQ != 0;
+}
+
+}  // namespace
+
+MainWindow::Command& MainWindow::Add(QMenu* menu, const QString& text, const char* icon, const QKeySequence& keys,
+                                     std::function<void()> run) {
+  auto* action = new QAction(text, this);
+  action->setShortcut(keys);
+  if (menu) menu->addAction(action);
+  connect(action, &QAction::triggered, this, std::move(run));
+  return *commands_.emplace_back(std::make_unique<Command>(Command{action, icon, {}, {}}));
+}
+
+MainWindow::Command& MainWindow::AddForDocument(QMenu* menu, const QString& text, const char* icon,
+                                                const QKeySequence& keys, std::function<void(DocumentFrame&)> run) {
+  Command& command = Add(menu, text, icon, keys, [this, run = std::move(run)] {
+    if (DocumentFrame* frame = Frame()) {
+      frame->Commit();
+      run(*frame);
+    }
+  });
+  command.enabled = [this] { return Frame() != nullptr; };
+  return command;
+}
+
+void MainWindow::BuildMenus() {
+  standardBar_ = addToolBar(tr("Standard"));
+  standardBar_->setObjectName("Standard");
+  std::string barName;
+  YbGetToolbarString(&barName, 0);
+  modelBar_ = addToolBar(Translated(barName));
+  modelBar_->setObjectName("Model");
+
+  QMenu* file = menuBar()->addMenu(tr("&File"));
+  Command& create = Add(file, tr("&New"), "new", QKeySequence::New, [this] { NewDocument(); });
+  Command& open = Add(file, tr("&Open…"), "open", QKeySequence::Open, [this] { emit welcome_->OpenWanted(); });
+  recentMenu_ = file->addMenu(tr("Open &Recent"));
+  connect(recentMenu_, &QMenu::aboutToShow, this, &MainWindow::FillRecentMenu);
+  file->addSeparator();
+  Command& save =
+      AddForDocument(file, tr("&Save"), "save", QKeySequence::Save, [this](DocumentFrame&) { SaveDocument(); });
+  AddForDocument(file, tr("Save &As…"), nullptr, QKeySequence::SaveAs, [this](DocumentFrame&) { SaveDocumentAs(); });
+  AddForDocument(file, tr("&What will be saved…"), nullptr, QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_S),
+                 [this](DocumentFrame& frame) { ShowChanges(frame); });
+  file->addSeparator();
+  AddForDocument(file, tr("&Close"), nullptr, QKeySequence::Close,
+                 [this](DocumentFrame& frame) { CloseDocument(&frame); });
+  Add(file, tr("&Quit"), nullptr, QKeySequence::Quit, [this] { close(); });
+  standardBar_->addActions({create.action, open.action, save.action});
+  standardBar_->addSeparator();
+
+  BuildEditMenu();
+  BuildViewMenu();
+  BuildRunMenu();
+  windowMenu_ = menuBar()->addMenu(tr("&Window"));
+  connect(windowMenu_, &QMenu::aboutToShow, this, &MainWindow::FillWindowMenu);
+  // Filled when it is opened; the keys work without that.
+  Add(nullptr, tr("&Next Document"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_Tab),
+      [this] { tabs_->setCurrentIndex((tabs_->currentIndex() + 1) % std::max(1, tabs_->count())); });
+  addAction(commands_.back()->action);
+  Add(nullptr, tr("Next &Pane"), nullptr, QKeySequence(Qt::Key_F6), [this] {
+    if (Frame()) Frame()->FocusNextPane();
+  });
+  addAction(commands_.back()->action);
+  BuildHelpMenu();
+}
+
+void MainWindow::BuildEditMenu() {
+  QMenu* edit = menuBar()->addMenu(tr("&Edit"));
+  Command& undo =
+      AddForDocument(edit, tr("&Undo"), "undo", QKeySequence::Undo, [](DocumentFrame& frame) { frame.Undo(); });
+  undo.enabled = [this] { return Frame() && Frame()->Session().Steps().CanUndo(); };
+  Command& redo =
+      AddForDocument(edit, tr("&Redo"), "redo", QKeySequence::Redo, [](DocumentFrame& frame) { frame.Redo(); });
+  redo.enabled = [this] { return Frame() && Frame()->Session().Steps().CanRedo(); };
+  undo.action->setObjectName("Undo");
+  redo.action->setObjectName("Redo");
+  edit->addSeparator();
+  // The widgets have these keys themselves; the menu shows them, so that they are found.
+  const auto forward = [&](const QString& text, const char* operation) {
+    connect(edit->addAction(text), &QAction::triggered, this, [this, operation] { CopyToKeyboardWidget(operation); });
+  };
+  forward(tr("Cu&t\tCtrl+X"), "cut");
+  forward(tr("&Copy\tCtrl+C"), "copy");
+  forward(tr("&Paste\tCtrl+V"), "paste");
+  forward(tr("Fill &Down\tCtrl+D"), "fillDown");
+  edit->addSeparator();
+  AddForDocument(edit, tr("&Find…"), "find", QKeySequence::Find, [](DocumentFrame& frame) { frame.StartFind(); });
+  AddForDocument(edit, tr("Copy &Path"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C),
+                 [](DocumentFrame& frame) { QApplication::clipboard()->setText(ToQt(frame.CurrentPath())); });
+  standardBar_->addActions({undo.action, redo.action});
+  standardBar_->addSeparator();
+}
+
+void MainWindow::CopyToKeyboardWidget(const char* operation) {
+  QWidget* focus = QApplication::focusWidget();
+  for (QWidget* widget = focus; widget; widget = widget->parentWidget()) {
+    if (auto* table = qobject_cast<TableView*>(widget); table && table->FocusTarget() == focus) {
+      const QString wanted(operation);
+      if (wanted == "cut") table->Cut();
+      if (wanted == "copy") table->Copy();
+      if (wanted == "paste") table->Paste();
+      if (wanted == "fillDown") table->FillDown();
+      return;
+    }
+  }
+  // Every text field of the toolkit has slots of these names.
+  if (focus && focus->metaObject()->indexOfMethod(QByteArray(operation) + "()") >= 0)
+    QMetaObject::invokeMethod(focus, operation);
+}
+
+void MainWindow::BuildViewMenu() {
+  QMenu* view = menuBar()->addMenu(tr("&View"));
+  Command& back = AddForDocument(view, tr("&Back"), "back", QKeySequence(Qt::ALT | Qt::Key_Left),
+                                 [](DocumentFrame& frame) { frame.Go(-1); });
+  back.enabled = [this] { return Frame() && Frame()->CanGo(-1); };
+  Command& forward = AddForDocument(view, tr("&Forward"), "forward", QKeySequence(Qt::ALT | Qt::Key_Right),
+                                    [](DocumentFrame& frame) { frame.Go(1); });
+  forward.enabled = [this] { return Frame() && Frame()->CanGo(1); };
+  AddForDocument(view, tr("&Overview"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_I), [](DocumentFrame& frame) {
+    if (const CYbSEKvfBase* overview = frame.Session().Document().Root().GetImportantNode("OVERVIEW"))
+      frame.GoTo(overview->Serial());
+  });
+  view->addSeparator();
+  AddForDocument(view, tr("Next F&inding"), nullptr, QKeySequence(Qt::Key_F8),
+                 [](DocumentFrame& frame) { frame.StepFinding(1); });
+  AddForDocument(view, tr("&Previous Finding"), nullptr, QKeySequence(Qt::SHIFT | Qt::Key_F8),
+                 [](DocumentFrame& frame) { frame.StepFinding(-1); });
+  Command& marks = AddForDocument(view, "Show Validation Icons", nullptr, {}, [](DocumentFrame& frame) {
+    CViewSettingsKvf& settings = ViewSettingsOf(frame);
+    settings.ShowValidationIcons = settings.ShowValidationIcons ? 0 : 1;
+    frame.Change(settings, kDataChanged, tr("Show Validation Icons"));
+  });
+  marks.checked = [this] { return Frame() && ViewSettingsOf(*Frame()).ShowValidationIcons != 0; };
+  view->addSeparator();
+  Add(view, tr("Zoom &In"), nullptr, QKeySequence::ZoomIn, [this] { SetZoom(Theme::Get().Zoom() + 0.1); });
+  Add(view, tr("Zoom O&ut"), nullptr, QKeySequence::ZoomOut, [this] { SetZoom(Theme::Get().Zoom() - 0.1); });
+  Add(view, tr("&Actual Size"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_0), [this] { SetZoom(1); });
+  QMenu* looks = view->addMenu(tr("App&earance"));
+  auto* group = new QActionGroup(this);
+  const auto look = [&](const QString& text, Theme::Appearance appearance) {
+    Command& command = Add(looks, text, nullptr, {}, [this, appearance] {
+      program_.Settings().setValue("Appearance", static_cast<int>(appearance));
+      Theme::Get().SetAppearance(appearance);
+    });
+    command.checked = [appearance] { return Theme::Get().GetAppearance() == appearance; };
+    group->addAction(command.action);
+  };
+  look(tr("As the &System"), Theme::Appearance::System);
+  look(tr("&Light"), Theme::Appearance::Light);
+  look(tr("&Dark"), Theme::Appearance::Dark);
+  standardBar_->addActions({back.action, forward.action});
+}
+
+void MainWindow::BuildRunMenu() {
+  Command& refresh = AddForDocument(
+      nullptr, tr("R&efresh"), "refresh", QKeySequence::Refresh,
+      [](DocumentFrame& frame) { frame.Change(frame.Session().Document().Root(), kRefreshPlots, tr("Refresh")); });
+  refresh.action->setToolTip(tr("Refresh graphic"));
+  // In a menu bar an icon would take the text's place.
+  Command& refreshInBar =
+      AddForDocument(nullptr, tr("R&efresh"), nullptr, {}, [&refresh](DocumentFrame&) { refresh.action->trigger(); });
+  menuBar()->addAction(refreshInBar.action);
+
+  QMenu* run = menuBar()->addMenu(tr("&Run"));
+  const auto flag = [&](const QString& text, int CExecuteEngineFlagsKvf::*member) -> Command& {
+    Command& command = AddForDocument(run, text, nullptr, {},
+                                      [this, member, text](DocumentFrame& frame) { ToggleFlag(frame, member, text); });
+    command.checked = [this, member] { return Frame() && FlagsOf(*Frame()).*member != 0; };
+    return command;
+  };
+  flag(tr("Preprocessing"), &CExecuteEngineFlagsKvf::PP);
+  flag(tr("Water movement"), &CExecuteEngineFlagsKvf::WM);
+  Command& quality = flag(tr("Water quality"), &CExecuteEngineFlagsKvf::WQ);
+  quality.enabled = [this] { return Frame() && HasWaterQuality(*Frame()); };
+  quality.checked = [this] { return Frame() && HasWaterQuality(*Frame()) && FlagsOf(*Frame()).WQ != 0; };
+  run->addSeparator();
+  AddForDocument(run, tr("Execute..."), nullptr, {}, [this](DocumentFrame& frame) { RunEngine(frame, {}); });
+
+  modelBar_->addAction(refresh.action);
+  modelBar_->addSeparator();
+  const auto button = [&](const QString& text, const char* icon, const QString& argument) {
+    Command& command =
+        AddForDocument(nullptr, text, icon, {}, [this, argument](DocumentFrame& frame) { RunEngine(frame, argument); });
+    modelBar_->addAction(command.action);
+  };
+  button(tr("Run preprocessor only"), "run_preprocessor", "/PP");
+  button(tr("Run water movement only"), "run_water_movement", "/WM");
+  modelBar_->addSeparator();
+  button(tr("Run water quality only"), "run_water_quality", "/WQ");
+}
+
+void MainWindow::ToggleFlag(DocumentFrame& frame, int CExecuteEngineFlagsKvf::*flag, const QString& action) {
+  CExecuteEngineFlagsKvf& flags = FlagsOf(frame);
+  flags.*flag = flags.*flag ? 0 : 1;
+  frame.Change(flags, kDataChanged, tr("Change %1").arg(action));
+}
+
+void MainWindow::RunEngine(DocumentFrame& frame, const QString& argument) {
+  if (frame.Session().IsModified() && !SaveDocument()) {
+    host_.Tell("Unable to run setup: Failed to save specification file.", Host::Icon::Error);
+    return;
+  }
+  const QString command = QString("Tvn_Simulation \"%1\" %2").arg(ToQt(frame.Session().Path()), argument).trimmed();
+  host_.Tell(
+      FromQt(tr("This version of the editor does not start engines itself. The setup is saved; run it with\n\n%1")
+                 .arg(command)),
+      Host::Icon::Information);
+}
+
+void MainWindow::BuildHelpMenu() {
+  QMenu* help = menuBar()->addMenu(tr("&Help"));
+  AddForDocument(help, tr("Help on This &Page"), nullptr, QKeySequence::HelpContents, [this](DocumentFrame& frame) {
+    if (!frame.OnHelp()) keys_->trigger();
+  });
+  Command& keys = Add(help, tr("&Keys"), nullptr, {}, [this] {
+    QString rows;
+    for (const auto& command : commands_)
+      if (!command->action->shortcut().isEmpty())
+        rows += QString("<tr><td>%1&nbsp;&nbsp;</td><td>%2</td></tr>")
+                    .arg(command->action->shortcut().toString(QKeySequence::NativeText),
+                         command->action->text().remove('&').toHtmlEscaped());
+    QMessageBox::information(this, tr("Keys"), "<table>" + rows + "</table>");
+  });
+  keys_ = keys.action;
+  Add(help, tr("&About Quarzel"), nullptr, {}, [this] {
+    QMessageBox::about(
+        this, tr("About Quarzel"),
+        tr("<h3>Quarzel %1</h3><p>The setup editor of the integrated catchment model Tervane.</p>"
+           "<p>Copyright © 2026 the Tervane developers. Free software under the GNU General Public License, version 3 "
+           "or later: you may use, change and share it; it comes without warranty.</p><p>Built on Qt %2, UDUNITS and "
+           "fmt.</p>")
+            .arg(QApplication::applicationVersion(), qVersion()));
+  });
+}
+
+void MainWindow::FillRecentMenu() {
+  recentMenu_->clear();
+  const QStringList files = program_.RecentFiles();
+  int number = 0;
+  for (const QString& path : files)
+    connect(recentMenu_->addAction(QString("&%1  %2").arg(++number % 10).arg(QString(path).replace("&", "&&"))),
+            &QAction::triggered, this, [this, path] { OpenDocument(path); });
+  if (files.isEmpty()) recentMenu_->addAction(tr("No setup was open yet"))->setEnabled(false);
+  recentMenu_->addSeparator();
+  QAction* forget = recentMenu_->addAction(tr("&Forget These"));
+  forget->setEnabled(!files.isEmpty());
+  connect(forget, &QAction::triggered, this, [this] {
+    program_.ForgetRecentFiles();
+    SyncCommands();
+  });
+}
+
+void MainWindow::FillWindowMenu() {
+  windowMenu_->clear();
+  for (const auto& command : commands_)
+    if (command->action->shortcut() == QKeySequence(Qt::CTRL | Qt::Key_Tab) ||
+        command->action->shortcut() == QKeySequence(Qt::Key_F6))
+      windowMenu_->addAction(command->action);
+  windowMenu_->addSeparator();
+  for (int i = 0; i < tabs_->count(); ++i) {
+    QAction* action = windowMenu_->addAction(QString("&%1  %2").arg(i + 1).arg(tabs_->tabText(i)));
+    action->setCheckable(true);
+    action->setChecked(i == tabs_->currentIndex());
+    connect(action, &QAction::triggered, this, [this, i] { tabs_->setCurrentIndex(i); });
+  }
+}
+
+void MainWindow::SyncCommands() {
+  for (const auto& command : commands_) {
+    if (command->enabled) command->action->setEnabled(command->enabled());
+    if (command->checked) {
+      command->action->setCheckable(true);
+      command->action->setChecked(command->checked());
+    }
+  }
+  const DocumentFrame* current = Frame();
+  const auto named = [](const QString& text, const std::string& step) {
+    return step.empty() ? text : QString("%1 %2").arg(text, Translated(step));
+  };
+  if (auto* undo = findChild<QAction*>("Undo"))
+    undo->setText(named(tr("&Undo"), current ? current->Session().Steps().UndoName() : std::string()));
+  if (auto* redo = findChild<QAction*>("Redo"))
+    redo->setText(named(tr("&Redo"), current ? current->Session().Steps().RedoName() : std::string()));
+  for (int i = 0; i < tabs_->count(); ++i) {
+    const auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i));
+    tabs_->setTabText(i, QString(frame->Title()).replace("&", "&&"));
+    tabs_->setTabToolTip(i, ToQt(frame->Session().Path()));
+  }
+  setWindowTitle(current ? tr("%1 - Quarzel").arg(current->Title()) : QString("Quarzel"));
+  setWindowModified(false);
+  if (welcome_) {
+    if (!current) welcome_->Show(program_.RecentFiles());
+    stack_->setCurrentWidget(current ? static_cast<QWidget*>(tabs_) : welcome_);
+  }
+  // The model's commands are of use only while a document is open.
+  modelBar_->setEnabled(current != nullptr);
+}
+
+void MainWindow::RestyleCommands() {
+  for (const auto& command : commands_)
+    if (command->icon) command->action->setIcon(Theme::Get().Icon(command->icon));
+}
+
+}  // namespace tervane

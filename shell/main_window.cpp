@@ -1,0 +1,274 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/main_window.h"
+
+#include <QApplication>
+#include <QCloseEvent>
+#include <QDateTime>
+#include <QFileInfo>
+#include <QLabel>
+#include <QMenuBar>
+#include <QMessageBox>
+#include <QMimeData>
+#include <QPushButton>
+#include <QStackedWidget>
+#include <QStatusBar>
+#include <QTabWidget>
+#include <QTimer>
+#include <QToolBar>
+
+#include "document/edit_session.h"
+#include "platform/files.h"
+#include "shell/changes_dialog.h"
+#include "shell/document_frame.h"
+#include "shell/program.h"
+#include "shell/qt_text.h"
+#include "shell/theme.h"
+#include "shell/welcome_page.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr const char* kSetupFilter = "Tervane  Flow Model(*.tvd)|*.tvd|All Files (*.*)|*||";
+constexpr const char *kGeometry = "Window/Geometry", *kState = "Window/State", *kFrameLayout = "Window/Document";
+
+QStringList DroppedSetups(const QMimeData* data) {
+  QStringList paths;
+  for (const QUrl& url : data->urls())
+    if (url.isLocalFile() && url.toLocalFile().endsWith(".tvd", Qt::CaseInsensitive)) paths << url.toLocalFile();
+  return paths;
+}
+
+}  // namespace
+
+MainWindow::MainWindow(Program& program) : program_(program), host_(this, program.Settings()) {
+  setWindowIcon(Theme::Get().Icon("quarzel"));
+  setAcceptDrops(true);
+  tabs_ = new QTabWidget;
+  tabs_->setDocumentMode(true);
+  tabs_->setTabsClosable(true);
+  tabs_->setMovable(true);
+  stack_ = new QStackedWidget;
+  stack_->addWidget(tabs_);
+  setCentralWidget(stack_);
+  zoom_ = new QLabel;
+  statusBar()->addPermanentWidget(zoom_);
+  BuildMenus();
+  connect(tabs_, &QTabWidget::currentChanged, this, &MainWindow::SyncCommands);
+  connect(tabs_, &QTabWidget::tabCloseRequested, this,
+          [this](int index) { CloseDocument(qobject_cast<DocumentFrame*>(tabs_->widget(index))); });
+  connect(&Theme::Get(), &Theme::Changed, this, &MainWindow::Restyle);
+  resize(Theme::Get().Scaled(1180), Theme::Get().Scaled(780));
+  restoreGeometry(program_.Settings().value(kGeometry).toByteArray());
+  restoreState(program_.Settings().value(kState).toByteArray());
+  Restyle();
+}
+
+MainWindow::~MainWindow() {
+  // Documents speak to the window while they go.
+  while (tabs_->count() > 0) delete tabs_->widget(0);
+}
+
+DocumentFrame* MainWindow::Frame() const { return qobject_cast<DocumentFrame*>(tabs_->currentWidget()); }
+
+DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
+  const bool isNew = session->Path().empty();
+  const QString name = isNew ? tr("Untitled %1").arg(++newDocuments_) : QString();
+  if (!isNew) program_.AddRecentFile(ToQt(session->Path()));
+  auto* frame = new DocumentFrame(std::move(session), name, host_, program_);
+  frame->RestoreLayout(program_.Settings().value(kFrameLayout).toByteArray());
+  connect(frame, &DocumentFrame::StateChanged, this, &MainWindow::SyncCommands);
+  connect(frame, &DocumentFrame::SaveAsWanted, this, &MainWindow::SaveDocumentAs);
+  connect(
+      frame, &DocumentFrame::ReloadWanted, this, [this, frame] { ReloadDocument(frame); }, Qt::QueuedConnection);
+  connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
+  tabs_->setCurrentIndex(tabs_->addTab(frame, frame->Title()));
+  SyncCommands();
+  return frame;
+}
+
+void MainWindow::NewDocument() { AddFrame(EditSession::New(program_.RecoveryFolder())); }
+
+bool MainWindow::OpenDocument(const QString& path) {
+  const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
+  for (int i = 0; i < tabs_->count(); ++i) {
+    const auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i));
+    if (frame->Session().Path() == file || IsSameFile(frame->Session().Path(), file)) {
+      tabs_->setCurrentIndex(i);
+      return true;
+    }
+  }
+  std::string error;
+  auto session = EditSession::Open(file, program_.RecoveryFolder(), error);
+  if (!session) {
+    host_.Tell(error, Host::Icon::Error);
+    return false;
+  }
+  const bool mayRecover = !session->IsReadOnly();
+  DocumentFrame* frame = AddFrame(std::move(session));
+  const auto recovery = mayRecover ? FindRecovery(file, program_.RecoveryFolder()) : std::nullopt;
+  if (recovery) {
+    const QString time = QLocale().toString(QDateTime::fromSecsSinceEpoch(
+        std::chrono::duration_cast<std::chrono::seconds>(recovery->time.time_since_epoch()).count()));
+    frame->ShowBanner(tr("Changes to this setup that were never saved are left from %1.").arg(time),
+                      {{tr("&Recover"),
+                        [this, frame, recovery = *recovery] {
+                          QTimer::singleShot(0, this, [this, frame, recovery] {
+                            if (!CloseDocument(frame)) return;
+                            std::string why;
+                            if (auto recovered = EditSession::Recover(recovery, program_.RecoveryFolder(), why))
+                              AddFrame(std::move(recovered))->Log(tr("Recovered from %1").arg(ToQt(recovery.autosave)));
+                            else
+                              host_.Tell(why, Host::Icon::Error);
+                          });
+                        }},
+                       {tr("&Throw Away"), [this, recovery = *recovery] {
+                          std::string why;
+                          if (!DiscardRecovery(recovery, why)) host_.Tell(why, Host::Icon::Error);
+                        }}});
+  }
+  return true;
+}
+
+void MainWindow::OfferRecoveries() {
+  const std::vector<Recovery> found = FindRecoveries(program_.RecoveryFolder());
+  if (found.empty()) return;
+  QStringList names;
+  for (const Recovery& recovery : found)
+    names << (recovery.setup.empty() ? tr("a setup that was never saved") : ToQt(recovery.setup));
+  const std::string question = FromQt(
+      tr("The editor ended before these were saved:\n\n%1\n\nOpen what is left of them? They stay where they are "
+         "if you do not.")
+          .arg(names.join("\n")));
+  if (host_.Ask(question, Host::Icon::Question, Host::Buttons::YesNo) != Host::Answer::Yes) return;
+  for (const Recovery& recovery : found) {
+    std::string error;
+    if (auto session = EditSession::Recover(recovery, program_.RecoveryFolder(), error))
+      AddFrame(std::move(session));
+    else
+      host_.Tell(error, Host::Icon::Error);
+  }
+}
+
+bool MainWindow::SaveDocument() {
+  DocumentFrame* frame = Frame();
+  if (!frame) return false;
+  frame->Commit();
+  EditSession& session = frame->Session();
+  if (session.Path().empty() || session.IsReadOnly()) return SaveDocumentAs();
+  if (session.CheckDisk() == EditSession::OnDisk::Changed) {
+    const QString question = tr("Another program has changed %1 since it was read. Save over it?").arg(frame->Name());
+    if (host_.Ask(FromQt(question), Host::Icon::Warning, Host::Buttons::YesNo) != Host::Answer::Yes) return false;
+    session.AcceptDisk();
+  }
+  return frame->Save(session.Path());
+}
+
+bool MainWindow::SaveDocumentAs() {
+  DocumentFrame* frame = Frame();
+  if (!frame) return false;
+  frame->Commit();
+  const std::string current =
+      frame->Session().Path().empty() ? FromQt(frame->Name() + ".tvd") : frame->Session().Path();
+  const auto path = host_.AskFileToSave({"Save As", kSetupFilter, "tvd", current});
+  return path && frame->Save(*path);
+}
+
+void MainWindow::ReloadDocument(DocumentFrame* frame) {
+  const QString path = ToQt(frame->Session().Path());
+  const std::string place = frame->CurrentPath();
+  if (frame->Session().IsModified() &&
+      host_.Ask(FromQt(tr("Throw your own changes to %1 away and read the file again?").arg(frame->Name())),
+                Host::Icon::Warning, Host::Buttons::YesNo) != Host::Answer::Yes) {
+    frame->CheckDisk();
+    return;
+  }
+  delete frame;
+  if (OpenDocument(path) && Frame()) Frame()->GoToPath(place);
+  SyncCommands();
+}
+
+void MainWindow::ShowChanges(DocumentFrame& frame) {
+  frame.Commit();
+  std::string error;
+  const std::vector<SetupDifference> differences = frame.Session().WhatWillBeSaved(error);
+  if (!error.empty()) {
+    host_.Tell(error, Host::Icon::Error);
+    return;
+  }
+  ChangesDialog dialog(differences, !frame.Session().IsReadOnly(), this);
+  if (dialog.exec() == QDialog::Accepted) SaveDocument();
+}
+
+bool MainWindow::CloseDocument(DocumentFrame* frame) {
+  if (!frame) return true;
+  tabs_->setCurrentWidget(frame);
+  frame->Commit();
+  if (frame->Session().IsModified()) {
+    QMessageBox box(QMessageBox::Question, tr("Close"),
+                    tr("Save the changes to %1 before it is closed?").arg(frame->Name()),
+                    QMessageBox::Save | QMessageBox::Discard | QMessageBox::Cancel, this);
+    box.setInformativeText(tr("Changes that are not saved are lost."));
+    const int answer = box.exec();
+    if (answer == QMessageBox::Save && !SaveDocument()) return false;
+    if (answer != QMessageBox::Save && answer != QMessageBox::Discard) return false;
+  }
+  program_.Settings().setValue(kFrameLayout, frame->SaveLayout());
+  delete frame;
+  SyncCommands();
+  return true;
+}
+
+void MainWindow::closeEvent(QCloseEvent* event) {
+  while (tabs_->count() > 0) {
+    if (!CloseDocument(qobject_cast<DocumentFrame*>(tabs_->widget(0)))) {
+      event->ignore();
+      return;
+    }
+  }
+  program_.Settings().setValue(kGeometry, saveGeometry());
+  program_.Settings().setValue(kState, saveState());
+  event->accept();
+}
+
+void MainWindow::changeEvent(QEvent* event) {
+  QMainWindow::changeEvent(event);
+  if (event->type() == QEvent::ActivationChange && isActiveWindow() && Frame()) Frame()->CheckDisk();
+}
+
+void MainWindow::dragEnterEvent(QDragEnterEvent* event) {
+  if (!DroppedSetups(event->mimeData()).isEmpty()) event->acceptProposedAction();
+}
+
+void MainWindow::dropEvent(QDropEvent* event) {
+  event->acceptProposedAction();
+  for (const QString& path : DroppedSetups(event->mimeData())) OpenDocument(path);
+}
+
+void MainWindow::SetZoom(double zoom) {
+  Theme::Get().SetZoom(zoom);
+  program_.Settings().setValue("Zoom", Theme::Get().Zoom());
+}
+
+void MainWindow::Restyle() {
+  RestyleCommands();
+  const int size = Theme::Get().Scaled(18);
+  for (QToolBar* bar : {standardBar_, modelBar_}) bar->setIconSize(QSize(size, size));
+  // A menu bar keeps the font with which it was made.
+  menuBar()->setFont(QApplication::font());
+  zoom_->setText(QString("%1 %").arg(qRound(Theme::Get().Zoom() * 100)));
+  if (welcome_) stack_->removeWidget(welcome_);
+  delete welcome_;
+  welcome_ = new WelcomePage;
+  stack_->addWidget(welcome_);
+  connect(welcome_, &WelcomePage::NewWanted, this, &MainWindow::NewDocument);
+  connect(welcome_, &WelcomePage::FileWanted, this, &MainWindow::OpenDocument);
+  connect(welcome_, &WelcomePage::OpenWanted, this, [this] {
+    if (const auto path = host_.AskFileToOpen({"Open", kSetupFilter, "tvd", {}})) OpenDocument(ToQt(*path));
+  });
+  for (int i = 0; i < tabs_->count(); ++i) qobject_cast<DocumentFrame*>(tabs_->widget(i))->Redraw();
+  SyncCommands();
+}
+
+}  // namespace tervane

@@ -1,0 +1,99 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <QMainWindow>
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "shell/qt_host.h"
+
+class QLabel;
+class QMenu;
+class QStackedWidget;
+class QTabWidget;
+class QToolBar;
+
+namespace tervane {
+
+class CExecuteEngineFlagsKvf;
+class DocumentFrame;
+class EditSession;
+class Program;
+class WelcomePage;
+
+/// The window of the program: documents in tabs, and the commands on them.
+class MainWindow : public QMainWindow {
+  Q_OBJECT
+
+ public:
+  explicit MainWindow(Program& program);
+  ~MainWindow() override;
+
+  DocumentFrame* Frame() const;
+  void NewDocument();
+  /// Opens a setup in a tab of its own, or shows the one in which it is open. False when it could not be opened; the
+  /// user has been told why.
+  bool OpenDocument(const QString& path);
+  /// Offers what a crash left of setups that nobody opens by name.
+  void OfferRecoveries();
+  bool SaveDocument();
+  bool SaveDocumentAs();
+  /// False when the user wants to go on with it.
+  bool CloseDocument(DocumentFrame* frame);
+
+ protected:
+  void closeEvent(QCloseEvent* event) override;
+  void changeEvent(QEvent* event) override;
+  void dragEnterEvent(QDragEnterEvent* event) override;
+  void dropEvent(QDropEvent* event) override;
+
+ private:
+  /// An action that is enabled only while its rule holds, and checked as its other rule says.
+  struct Command {
+    QAction* action;
+    const char* icon;
+    std::function<bool()> enabled;
+    std::function<bool()> checked;
+  };
+
+  // In main_menus.cpp.
+  void BuildMenus();
+  void BuildEditMenu();
+  void BuildViewMenu();
+  void BuildRunMenu();
+  void BuildHelpMenu();
+  Command& Add(QMenu* menu, const QString& text, const char* icon, const QKeySequence& keys, std::function<void()> run);
+  /// A command on the current document.
+  Command& AddForDocument(QMenu* menu, const QString& text, const char* icon, const QKeySequence& keys,
+                          std::function<void(DocumentFrame&)> run);
+  void FillRecentMenu();
+  void FillWindowMenu();
+  void SyncCommands();
+  void RestyleCommands();
+
+  DocumentFrame* AddFrame(std::unique_ptr<EditSession> session);
+  void ReloadDocument(DocumentFrame* frame);
+  void ShowChanges(DocumentFrame& frame);
+  void CopyToKeyboardWidget(const char* operation);
+  void ToggleFlag(DocumentFrame& frame, int CExecuteEngineFlagsKvf::*flag, const QString& action);
+  void RunEngine(DocumentFrame& frame, const QString& argument);
+  void SetZoom(double zoom);
+  void Restyle();
+
+  Program& program_;
+  QtHost host_;
+  std::vector<std::unique_ptr<Command>> commands_;
+  QTabWidget* tabs_;
+  QStackedWidget* stack_;
+  WelcomePage* welcome_ = nullptr;
+  QToolBar *standardBar_, *modelBar_;
+  QMenu *recentMenu_ = nullptr, *windowMenu_ = nullptr;
+  QAction* keys_ = nullptr;
+  QLabel* zoom_;
+  int newDocuments_ = 0;
+};
+
+}  // namespace tervane

@@ -1,0 +1,33 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <QPointer>
+#include <QSettings>
+#include <QWidget>
+
+#include "platform/host.h"
+
+namespace tervane {
+
+/// The questions of pages and documents as dialogs of the desktop.
+class QtHost : public Host {
+ public:
+  QtHost(QWidget* window, QSettings& settings) : window_(window), settings_(settings) {}
+
+  Answer Ask(const std::string& text, Icon icon, Buttons buttons) override;
+  std::optional<std::string> AskFileToOpen(const FileQuestion& question) override;
+  std::optional<std::string> AskFileToSave(const FileQuestion& question) override;
+  void OpenBrowser(const std::string& address) override;
+  std::string Setting(const std::string& name) const override;
+  void SetSetting(const std::string& name, const std::string& value) override;
+
+ private:
+  QPointer<QWidget> window_;
+  QSettings& settings_;
+};
+
+/// A filter of texts and patterns in turn, "Grid file (*.nds2)|*.nds2||", as the toolkit's dialogs want it.
+QString DialogFilter(const std::string& filter);
+
+}  // namespace tervane

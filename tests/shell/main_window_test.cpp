@@ -1,0 +1,152 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/main_window.h"
+
+#include <QMessageBox>
+#include <QPushButton>
+#include <QTabWidget>
+#include <QTimer>
+
+#include <gmock/gmock.h>
+
+#include "shell/theme.h"
+#include "tests/shell/opened_setup.h"
+
+namespace tervane {
+namespace {
+
+using test::OpenedSetup;
+using testing::HasSubstr;
+
+/// Answers the next message box with the button of that text, and keeps what it said.
+class NextAnswer {
+ public:
+  explicit NextAnswer(const QString& button) {
+    timer_.setInterval(5);
+    QObject::connect(&timer_, &QTimer::timeout, [this, button] {
+      auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
+      if (!box) return;
+      text_ = FromQt(box->text());
+      for (QAbstractButton* each : box->buttons())
+        if (QString(each->text()).remove('&') == button) return each->click();
+      ADD_FAILURE() << "no button " << FromQt(button) << " under: " << text_;
+      box->reject();
+    });
+    timer_.start();
+  }
+  const std::string& Text() const { return text_; }
+
+ private:
+  QTimer timer_;
+  std::string text_;
+};
+
+TEST(MainWindow, RunCommandsFollowTheComponents) {
+  OpenedSetup setup;
+  QAction* quality = setup.Action("Water quality");
+  EXPECT_FALSE(quality->isEnabled());
+  EXPECT_FALSE(quality->isChecked());
+  EXPECT_TRUE(setup.Action("Preprocessing")->isChecked());
+  setup.Command("Preprocessing");
+  EXPECT_FALSE(setup.Action("Preprocessing")->isChecked());
+  EXPECT_EQ(setup.Value("ExecuteEngineFlagsKvf:PP"), "0");
+  EXPECT_EQ(setup.Session().Steps().UndoName(), "Change Preprocessing");
+
+  OpenedSetup withQuality(
+      "section SimSpec {\nsection ModelComp {\nWQ = 1\n}\n}\nsection ExecuteEngineFlagsKvf {\nWQ = 1\n}");
+  EXPECT_TRUE(withQuality.Action("Water quality")->isEnabled());
+  EXPECT_TRUE(withQuality.Action("Water quality")->isChecked());
+}
+
+TEST(MainWindow, RefreshMarksTheDocumentModified) {
+  OpenedSetup setup;
+  setup.Command("Refresh");
+  EXPECT_TRUE(setup.Session().IsModified());
+  EXPECT_FALSE(setup.Session().Steps().CanUndo());
+}
+
+TEST(MainWindow, MarksInTheTreeAreShownAsTheSetupSays) {
+  OpenedSetup setup("section ViewSettings {\nShowValidationIcons = 0\n}");
+  EXPECT_FALSE(setup.Action("Show Validation Icons")->isChecked());
+  setup.Command("Show Validation Icons");
+  EXPECT_EQ(setup.Value("ViewSettings:ShowValidationIcons"), "1");
+}
+
+TEST(MainWindow, ClosingAsksForChangesAndLosesNoneUnasked) {
+  for (const char* answer : {"Cancel", "Save", "Discard"}) {
+    SCOPED_TRACE(answer);
+    OpenedSetup setup;
+    setup.GoTo("SimSpec/SimTitle:Title");
+    setup.Type("Karup");  // still in the field
+    const std::string before = test::ReadFile(setup.Path());
+    const NextAnswer next(answer);
+    EXPECT_EQ(setup.Window().CloseDocument(&setup.Frame()), std::string(answer) != "Cancel");
+    EXPECT_THAT(next.Text(), HasSubstr("karup.tvd"));
+    const std::string after = test::ReadFile(setup.Path());
+    EXPECT_EQ(after != before, std::string(answer) == "Save");
+    EXPECT_EQ(setup.Window().Frame() != nullptr, std::string(answer) == "Cancel");
+    if (setup.Window().Frame()) {
+      const NextAnswer throwAway("Discard");
+      setup.Window().close();
+    }
+  }
+}
+
+TEST(MainWindow, AFileThatIsNoSetupIsRefusedWithItsReason) {
+  OpenedSetup setup;
+  const std::string broken = setup.Folder().Write("broken.tvd", "target TERVANE_FLOWMODEL {\n  Key = 12x\n}\n");
+  const NextAnswer next("OK");
+  EXPECT_FALSE(setup.Window().OpenDocument(ToQt(broken)));
+  EXPECT_THAT(next.Text(), HasSubstr("broken.tvd:2:"));
+}
+
+TEST(MainWindow, OneFileIsOpenInOneTab) {
+  OpenedSetup setup;
+  setup.Window().NewDocument();
+  DocumentFrame* untitled = &setup.Frame();
+  EXPECT_TRUE(setup.Window().OpenDocument(ToQt(setup.Path())));
+  EXPECT_NE(&setup.Frame(), untitled);
+  EXPECT_EQ(setup.Window().findChild<QTabWidget*>()->count(), 2);
+}
+
+TEST(MainWindow, ASecondEditorOpensReadOnlyAndMaySaveElsewhere) {
+  OpenedSetup first;
+  Program program(ToQt(first.Folder().File("second/quarzel.ini")));
+  MainWindow second(program);
+  second.show();
+  ASSERT_TRUE(second.OpenDocument(ToQt(first.Path())));
+  EXPECT_TRUE(second.Frame()->Session().IsReadOnly());
+  EXPECT_THAT(FromQt(second.Frame()->Title()), HasSubstr("read-only"));
+  EXPECT_TRUE(second.Frame()->Save(first.Folder().File("copy.tvd")));
+  EXPECT_FALSE(second.Frame()->Session().IsReadOnly());
+}
+
+TEST(MainWindow, AFileThatChangedOnDiskIsReadAgainOnRequest) {
+  OpenedSetup setup;
+  setup.Folder().Write("karup.tvd",
+                       test::SetupText(14, "section SimSpec {\nsection SimTitle {\nTitle = \"other\"\n}\n}"));
+  setup.Frame().CheckDisk();
+  QPushButton* reload = nullptr;
+  for (QPushButton* button : setup.Frame().findChildren<QPushButton*>())
+    if (button->text() == "&Reload") reload = button;
+  ASSERT_TRUE(reload);
+  reload->click();
+  QApplication::processEvents();
+  EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "other");
+}
+
+TEST(MainWindow, ZoomAndAppearanceKeepPageAndTypedTexts) {
+  OpenedSetup setup;
+  setup.GoTo("SimSpec/SimTitle:Title");
+  setup.Type("Karup");
+  setup.Command("Zoom In");
+  setup.Command("Dark");
+  EXPECT_EQ(setup.Frame().CurrentPath(), "SimSpec/SimTitle");
+  EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "Karup");
+  EXPECT_TRUE(Theme::Get().IsDark());
+  setup.Command("Actual Size");
+  setup.Command("As the System");
+}
+
+}  // namespace
+}  // namespace tervane
