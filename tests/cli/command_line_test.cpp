@@ -11,6 +11,7 @@
 #include <rapidjson/document.h>
 #include <sys/stat.h>
 
+#include "document/setup_lock.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -20,6 +21,7 @@ namespace {
 using test::ReadFile;
 using test::SetupText;
 using test::TempFolder;
+using testing::AllOf;
 using testing::EndsWith;
 using testing::HasSubstr;
 using testing::IsEmpty;
@@ -180,6 +182,24 @@ TEST_F(CommandLine, SetChangesOneValueAndNothingElse) {
   EXPECT_EQ(Tervane({"get", file, "SimSpec/SimTitle:Touched"}).out, "1\n");
   Tervane({"set", file, "ExtraParams:NoOfParams", "2"});
   EXPECT_EQ(Tervane({"get", file, "ExtraParams/ExtraParam_2:Type"}).out, "0\n");
+}
+
+TEST_F(CommandLine, WhatAnEditorHasOpenIsNotWrittenUnlessForced) {
+  Tervane({"new", file});
+  const std::string before = ReadFile(file);
+  SetupLock lock;
+  ASSERT_EQ(lock.Take(file), SetupLock::Outcome::Taken);
+  const std::string other = folder.Write("other.tvd", SetupText(14, ""));
+  for (Arguments arguments : {Arguments{"set", file, "SimSpec/SimTitle:Title", "x"}, Arguments{"convert", file, file},
+                              Arguments{"convert", other, file}, Arguments{"new", file}}) {
+    folder.Write("a.tvd", before);
+    const Outcome outcome = Tervane(arguments);
+    EXPECT_EQ(outcome.status, kCouldNot);
+    EXPECT_THAT(outcome.err, AllOf(HasSubstr(file + ": it is open"), HasSubstr("--force")));
+    EXPECT_EQ(ReadFile(file), before);
+    arguments.push_back("--force");
+    EXPECT_EQ(Tervane(arguments).status, kDone);
+  }
 }
 
 TEST_F(CommandLine, SetRefusesWhatTheKeyDoesNotTakeAndWritesNothing) {

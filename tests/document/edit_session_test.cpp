@@ -10,7 +10,7 @@
 #include <unistd.h>
 
 #include "platform/os.h"
-#include "simspec/model_components.h"
+#include "simspec/periods.h"
 #include "simspec/titles.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -154,21 +154,23 @@ TEST_F(EditSessionTest, ChangesAreUndoneAndViewsAreTold) {
   EXPECT_THAT(Session(Open(path))->Document().UseCustomResultFolder, true);
 }
 
-TEST_F(EditSessionTest, FindingsFollowEachChange) {
+TEST_F(EditSessionTest, FindingsFollowChangesOfTheNodeOrOfAllWhereThatWasAskedFor) {
+  folder.Write("a.tvd", ReadFile(TERVANE_SOURCE_DIR "/examples/water_quality.tvd"));
   Session session = Open();
-  auto& components = *session->Document().Root().Important<CModelCompKvf>("MODELCOMP");
-  auto& quality = *session->Document().Root().Important<CModelCompWQKvf>("MODEL_COMP_WQ");
-  components.WQ = quality.UZ = 1;
-  components.UZ_ModelType = 2;
-  session->UpdateDoc(quality, 1, "Change Unsaturated Flow");
-  EXPECT_THAT(quality.Findings(), Not(IsEmpty()));
-  session->Undo();
-  EXPECT_THAT(quality.Findings(), IsEmpty());
-  // Another node was changed, and all were asked to look again.
-  components.WQ = quality.UZ = 1;
-  quality.SetRevalidateAll();
+  CGlobal& root = session->Document().Global();
+  // The water quality begins before the water movement.
+  CYbSEKvfBase& dates = *FindNode(root, ParseSetupPath("ModelCompWQ/SimulationPeriodWQ").steps);
+  EXPECT_THAT(dates.Findings(), Not(IsEmpty()));
+  auto& period = *root.Important<CSimPeriodKvf>("SIMPERIOD");
+  period.SIMSTART = CYbDateTime{1990, 1, 1};
+  session->UpdateDoc(period, 1, "Change Start Date");
+  EXPECT_THAT(dates.Findings(), Not(IsEmpty()));
+  period.SetRevalidateAll();
   SetTitle(*session, "x");
-  EXPECT_THAT(quality.Findings(), Not(IsEmpty()));
+  EXPECT_THAT(dates.Findings(), IsEmpty());
+  session->Undo();
+  session->Undo();
+  EXPECT_THAT(dates.Findings(), Not(IsEmpty()));
 }
 
 TEST_F(EditSessionTest, ASecondWindowOnASetupIsReadOnlyUntilItSavesElsewhere) {
