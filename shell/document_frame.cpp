@@ -59,7 +59,8 @@ DocumentFrame::DocumentFrame(std::unique_ptr<EditSession> session, const QString
   Refresh(kDataChanged);
   if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));
   if (session_->IsReadOnly())
-    ShowBanner(ToQt(session_->ReadOnlyReason()), {{tr("Save &As…"), [this] { emit SaveAsWanted(); }}});
+    ShowBanner(tr("Read-only: %1.").arg(ToQt(session_->ReadOnlyReason())),
+               {{tr("Save &As…"), [this] { emit SaveAsWanted(); }}});
   TellReport();
 }
 
@@ -70,6 +71,7 @@ DocumentFrame::~DocumentFrame() {
 
 void DocumentFrame::BuildBody() {
   const Theme& theme = Theme::Get();
+  builtZoom_ = theme.Zoom();
   treeTabs_ = new QTabWidget;
   treeTabs_->setDocumentMode(true);
   const auto tree = [&](int id, const QString& title, const QString& emptyText) {
@@ -328,9 +330,9 @@ void DocumentFrame::TellReport() {
     if (entry.kind == LoadReport::Kind::Warning) host_.Tell(entry.text, Host::Icon::Warning);
   if (report.unread.empty()) return;
   ShowBanner(
-      tr("This file holds %n thing(s) that the editor does not know. They are listed below; the first save keeps "
-         "the file as it was beside the new one.",
-         nullptr, static_cast<int>(report.unread.size())),
+      tr("Things in this file that the editor does not know: %1. They are listed below; the first save keeps the "
+         "file as it was beside the new one.")
+          .arg(report.unread.size()),
       {{tr("&What will be saved…"), [this] { emit ChangesWanted(); }}});
 }
 
@@ -362,16 +364,24 @@ void DocumentFrame::Log(const QString& line) { log_->Add(line); }
 QByteArray DocumentFrame::SaveLayout() const {
   QByteArray layout;
   QDataStream stream(&layout, QIODevice::WriteOnly);
-  stream << columns_->saveState() << rows_->saveState();
+  stream << columns_->sizes() << rows_->sizes() << builtZoom_;
   return layout;
 }
 
 void DocumentFrame::RestoreLayout(const QByteArray& layout) {
-  QByteArray columns, rows;
+  QList<int> columns, rows;
+  double zoom = 0;
   QDataStream stream(layout);
-  stream >> columns >> rows;
-  if (!columns.isEmpty()) columns_->restoreState(columns);
-  if (!rows.isEmpty()) rows_->restoreState(rows);
+  stream >> columns >> rows >> zoom;
+  if (columns.size() != 2 || rows.size() != 2 || zoom <= 0) return;
+  // The panes at the edges keep their share of the texts; the page has the rest.
+  const auto restore = [&](QSplitter& splitter, const QList<int>& sizes, int edge) {
+    const int all = sizes[0] + sizes[1];
+    const int kept = std::min(qRound(sizes[edge] * builtZoom_ / zoom), all / 2);
+    splitter.setSizes(edge == 0 ? QList<int>{kept, all - kept} : QList<int>{all - kept, kept});
+  };
+  restore(*columns_, columns, 0);
+  restore(*rows_, rows, 1);
 }
 
 }  // namespace tervane

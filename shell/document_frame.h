@@ -105,6 +105,7 @@ class DocumentFrame : public QWidget {
 
   QVBoxLayout* all_;
   QSplitter* columns_ = nullptr;
+  double builtZoom_ = 1;  ///< For which the panes have their sizes.
   QSplitter* rows_ = nullptr;
   QTabWidget* treeTabs_ = nullptr;
   QTabWidget* bottomTabs_ = nullptr;

@@ -31,7 +31,7 @@ namespace tervane {
 namespace {
 
 constexpr const char* kSetupFilter = "Tervane  Flow Model(*.tvd)|*.tvd|All Files (*.*)|*||";
-constexpr const char *kGeometry = "Window/Geometry", *kState = "Window/State", *kFrameLayout = "Window/Document";
+constexpr const char *kGeometry = "Window/Geometry", *kState = "Window/State", *kFrameLayout = "Window/Panes";
 
 QStringList DroppedSetups(const QMimeData* data) {
   QStringList paths;
@@ -84,6 +84,7 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
       frame, &DocumentFrame::ReloadWanted, this, [this, frame] { ReloadDocument(frame); }, Qt::QueuedConnection);
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
   tabs_->setCurrentIndex(tabs_->addTab(frame, frame->Title()));
+  frame->FocusNextPane();
   SyncCommands();
   return frame;
 }
@@ -132,7 +133,9 @@ bool MainWindow::OpenDocument(const QString& path) {
 }
 
 void MainWindow::OfferRecoveries() {
-  const std::vector<Recovery> found = FindRecoveries(program_.RecoveryFolder());
+  std::vector<Recovery> found = FindRecoveries(program_.RecoveryFolder());
+  // Of a setup that is open, here or elsewhere, its own banner asks.
+  std::erase_if(found, [](const Recovery& recovery) { return !recovery.setup.empty() && HolderOf(recovery.setup); });
   if (found.empty()) return;
   QStringList names;
   for (const Recovery& recovery : found)
@@ -182,6 +185,12 @@ void MainWindow::ReloadDocument(DocumentFrame* frame) {
       host_.Ask(FromQt(tr("Throw your own changes to %1 away and read the file again?").arg(frame->Name())),
                 Host::Icon::Warning, Host::Buttons::YesNo) != Host::Answer::Yes) {
     frame->CheckDisk();
+    return;
+  }
+  // What cannot be read takes nothing away.
+  CFlowModelDoc probe;
+  if (!probe.OnOpenDocument(frame->Session().Path())) {
+    host_.Tell(probe.Error(), Host::Icon::Error);
     return;
   }
   delete frame;

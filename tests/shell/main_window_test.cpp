@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/main_window.h"
 
+#include <QDir>
 #include <QMessageBox>
 #include <QPushButton>
 #include <QTabWidget>
@@ -40,6 +41,12 @@ class NextAnswer {
   QTimer timer_;
   std::string text_;
 };
+
+QPushButton* ReloadButton(OpenedSetup& setup) {
+  for (QPushButton* button : setup.Frame().findChildren<QPushButton*>())
+    if (button->text() == "&Reload") return button;
+  return nullptr;
+}
 
 TEST(MainWindow, RunCommandsFollowTheComponents) {
   OpenedSetup setup;
@@ -126,13 +133,43 @@ TEST(MainWindow, AFileThatChangedOnDiskIsReadAgainOnRequest) {
   setup.Folder().Write("karup.tvd",
                        test::SetupText(14, "section SimSpec {\nsection SimTitle {\nTitle = \"other\"\n}\n}"));
   setup.Frame().CheckDisk();
-  QPushButton* reload = nullptr;
-  for (QPushButton* button : setup.Frame().findChildren<QPushButton*>())
-    if (button->text() == "&Reload") reload = button;
+  QPushButton* reload = ReloadButton(setup);
   ASSERT_TRUE(reload);
   reload->click();
   QApplication::processEvents();
   EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "other");
+}
+
+TEST(MainWindow, AFileThatBecameUnreadableTakesNothingAway) {
+  OpenedSetup setup;
+  const DocumentFrame* frame = &setup.Frame();
+  setup.Folder().Write("karup.tvd", "no setup");
+  setup.Frame().CheckDisk();
+  QPushButton* reload = ReloadButton(setup);
+  ASSERT_TRUE(reload);
+  const NextAnswer answer("OK");
+  reload->click();
+  QApplication::processEvents();
+  EXPECT_THAT(answer.Text(), HasSubstr("karup.tvd:1:"));
+  EXPECT_EQ(setup.Window().Frame(), frame);
+}
+
+TEST(MainWindow, WhatACrashLeftIsOfferedOnlyWhileItsSetupIsOpenNowhere) {
+  OpenedSetup setup;
+  const std::string folder = setup.Program().RecoveryFolder();
+  ASSERT_TRUE(QDir().mkpath(ToQt(folder)));
+  AutosaveContent content;
+  content.setup = setup.Path();
+  content.process = EditorProcess::This();
+  content.process.started = "earlier";
+  content.text = test::SetupText(14, "section SimSpec {\nsection SimTitle {\nTitle = \"left\"\n}\n}");
+  ASSERT_TRUE(WriteAutosave(NewAutosaveName(setup.Path(), folder), content).Ok());
+  const NextAnswer answer("No");
+  setup.Window().OfferRecoveries();
+  EXPECT_EQ(answer.Text(), "");
+  ASSERT_TRUE(setup.Window().CloseDocument(&setup.Frame()));
+  setup.Window().OfferRecoveries();
+  EXPECT_THAT(answer.Text(), HasSubstr(setup.Path()));
 }
 
 TEST(MainWindow, ZoomAndAppearanceKeepPageAndTypedTexts) {
