@@ -43,9 +43,9 @@ ChangesDialog::ChangesDialog(const std::vector<SetupDifference>& differences, bo
   const Theme& theme = Theme::Get();
   resize(theme.Scaled(860), theme.Scaled(480));
   auto* all = new QVBoxLayout(this);
-  auto* summary = new QLabel(differences.empty() ? tr("A save would change nothing in the file on disk.")
-                                                 : tr("A save will change %n place(s) in the file on disk.", nullptr,
-                                                      static_cast<int>(differences.size())));
+  auto* summary = new QLabel(
+      differences.empty() ? tr("A save would change nothing in the file on disk.")
+                          : tr("Places that a save will change in the file on disk: %1").arg(differences.size()));
   all->addWidget(summary);
 
   auto* list = new QTreeWidget;
@@ -61,8 +61,10 @@ ChangesDialog::ChangesDialog(const std::vector<SetupDifference>& differences, bo
       section = new QTreeWidgetItem(list, {ToQt(path)});
       section->setExpanded(true);
     }
-    QTreeWidgetItem* row = difference.key.empty() ? section : new QTreeWidgetItem(section, {ToQt(difference.key)});
+    const bool isSection = difference.key.empty();
+    QTreeWidgetItem* row = isSection ? section : new QTreeWidgetItem(section, {ToQt(difference.key)});
     row->setText(1, KindText(difference.kind));
+    if (isSection && difference.from.empty() && difference.to.empty()) continue;
     row->setText(2, ValueText(difference.from, difference.fromDefault));
     row->setText(3, ValueText(difference.to, difference.toDefault));
     for (const int column : {2, 3}) row->setToolTip(column, row->text(column));

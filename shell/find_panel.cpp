@@ -11,6 +11,7 @@
 #include <QVBoxLayout>
 
 #include "shell/qt_text.h"
+#include "shell/row_delegate.h"
 #include "shell/theme.h"
 
 namespace tervane {
@@ -48,7 +49,8 @@ FindPanel::FindPanel(CYbSEDocument& document, QWidget* trees) : document_(docume
   list_->setHeaderHidden(true);
   list_->setRootIsDecorated(false);
   list_->setFrameShape(QFrame::NoFrame);
-  list_->setWordWrap(true);
+  list_->setAlternatingRowColors(true);
+  list_->setItemDelegate(new RowDelegate(list_));
   list_->installEventFilter(this);
   column->addWidget(list_, 1);
   stack_ = new QStackedWidget;
@@ -85,8 +87,8 @@ void FindPanel::Find() {
     item->setToolTip(0, ToQt(hit.key.empty() ? hit.path : hit.path + ":" + hit.key));
   }
   count_->setText(hits_.empty()               ? tr("Nothing found.")
-                  : hits_.size() == kMostHits ? tr("The first %n hits", nullptr, static_cast<int>(hits_.size()))
-                                              : tr("%n hit(s)", nullptr, static_cast<int>(hits_.size())));
+                  : hits_.size() == kMostHits ? tr("Hits: the first %1").arg(hits_.size())
+                                              : tr("Hits: %1").arg(hits_.size()));
   if (!hits_.empty()) list_->setCurrentItem(list_->topLevelItem(0));
 }
 

@@ -7,6 +7,7 @@
 #include <QContextMenuEvent>
 #include <QHeaderView>
 #include <QMenu>
+#include <QPainter>
 #include <algorithm>
 
 #include "shell/qt_text.h"
@@ -56,6 +57,7 @@ FindingsView::FindingsView() {
   header()->setSectionResizeMode(kKindColumn, QHeaderView::ResizeToContents);
   header()->setSectionResizeMode(kTextColumn, QHeaderView::Stretch);
   header()->setSectionResizeMode(kLineColumn, QHeaderView::ResizeToContents);
+  setColumnHidden(kLineColumn, true);
   setItemDelegate(new RowDelegate(this));
   connect(this, &QTreeWidget::itemClicked, this, [this](QTreeWidgetItem* item) { Choose(item); });
   connect(this, &QTreeWidget::itemActivated, this, [this](QTreeWidgetItem* item) { Choose(item); });
@@ -108,6 +110,16 @@ void FindingsView::Choose(QTreeWidgetItem* item) {
   const int row = indexOfTopLevelItem(item);
   if (row >= 0 && row < static_cast<int>(findings_.size()))
     emit FindingChosen(SetupFinding(findings_[static_cast<std::size_t>(row)]));
+}
+
+void FindingsView::paintEvent(QPaintEvent* event) {
+  QTreeWidget::paintEvent(event);
+  if (topLevelItemCount() > 0) return;
+  QPainter painter(viewport());
+  painter.setPen(Theme::Get().QuietColor());
+  const int margin = Theme::Get().Scaled(12);
+  painter.drawText(viewport()->rect().adjusted(margin, margin, -margin, -margin), Qt::AlignTop | Qt::AlignLeft,
+                   tr("No findings."));
 }
 
 void FindingsView::contextMenuEvent(QContextMenuEvent* event) {

@@ -26,6 +26,7 @@ class FindingsView : public QTreeWidget {
   void FindingChosen(const SetupFinding& finding);
 
  protected:
+  void paintEvent(QPaintEvent* event) override;
   void contextMenuEvent(QContextMenuEvent* event) override;
 
  private:

@@ -46,7 +46,10 @@ WelcomePage::WelcomePage() {
 
 void WelcomePage::Show(const QStringList& recentFiles) {
   while (QLayoutItem* item = recent_->takeAt(0)) {
-    if (item->widget()) item->widget()->deleteLater();
+    if (QWidget* shown = item->widget()) {
+      shown->hide();
+      shown->deleteLater();
+    }
     delete item;
   }
   if (recentFiles.isEmpty()) return;
