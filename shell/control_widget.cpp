@@ -318,14 +318,14 @@ class LineWidget : public ControlWidget {
     button->setIcon(Theme::Get().Icon("calendar"));
     button->setToolTip(tr("Choose a day"));
     button->setAccessibleName(tr("Calendar for %1").arg(Translated(Described().label)));
-    button->setPopupMode(QToolButton::InstantPopup);
     auto* menu = new QMenu(button);
     auto* calendar = new QCalendarWidget;
     calendar->setGridVisible(true);
     auto* action = new QWidgetAction(menu);
     action->setDefaultWidget(calendar);
     menu->addAction(action);
-    button->setMenu(menu);
+    connect(button, &QToolButton::clicked, menu,
+            [button, menu] { menu->popup(button->mapToGlobal(QPoint(0, button->height()))); });
     connect(menu, &QMenu::aboutToShow, this, [this, calendar] {
       Commit();
       if (const QDateTime date = ShownDate(); date.isValid()) calendar->setSelectedDate(date.date());

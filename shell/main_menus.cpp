@@ -83,7 +83,8 @@ void MainWindow::BuildMenus() {
   file->addSeparator();
   Command& save =
       AddForDocument(file, tr("&Save"), "save", QKeySequence::Save, [this](DocumentFrame&) { SaveDocument(); });
-  AddForDocument(file, tr("Save &As…"), nullptr, QKeySequence::SaveAs, [this](DocumentFrame&) { SaveDocumentAs(); });
+  AddForDocument(file, tr("Save &As…"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_S),
+                 [this](DocumentFrame&) { SaveDocumentAs(); });
   AddForDocument(file, tr("&What will be saved…"), nullptr, QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_S),
                  [this](DocumentFrame& frame) { ShowChanges(frame); });
   file->addSeparator();
@@ -117,6 +118,7 @@ void MainWindow::BuildEditMenu() {
   Command& redo =
       AddForDocument(edit, tr("&Redo"), "redo", QKeySequence::Redo, [](DocumentFrame& frame) { frame.Redo(); });
   redo.enabled = [this] { return Frame() && Frame()->Session().Steps().CanRedo(); };
+  redo.action->setShortcuts({QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_Z), QKeySequence(Qt::CTRL | Qt::Key_Y)});
   undo.action->setObjectName("Undo");
   redo.action->setObjectName("Redo");
   edit->addSeparator();
@@ -177,7 +179,10 @@ void MainWindow::BuildViewMenu() {
   });
   marks.checked = [this] { return Frame() && ViewSettingsOf(*Frame()).ShowValidationIcons != 0; };
   view->addSeparator();
-  Add(view, tr("Zoom &In"), nullptr, QKeySequence::ZoomIn, [this] { SetZoom(Theme::Get().Zoom() + 0.1); });
+  Command& zoomIn =
+      Add(view, tr("Zoom &In"), nullptr, QKeySequence::ZoomIn, [this] { SetZoom(Theme::Get().Zoom() + 0.1); });
+  // Where the plus sign needs the shift key.
+  zoomIn.action->setShortcuts({QKeySequence(QKeySequence::ZoomIn), QKeySequence(Qt::CTRL | Qt::Key_Equal)});
   Add(view, tr("Zoom O&ut"), nullptr, QKeySequence::ZoomOut, [this] { SetZoom(Theme::Get().Zoom() - 0.1); });
   Add(view, tr("&Actual Size"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_0), [this] { SetZoom(1); });
   QMenu* looks = view->addMenu(tr("App&earance"));
@@ -264,6 +269,18 @@ void MainWindow::BuildHelpMenu() {
         rows += QString("<tr><td>%1&nbsp;&nbsp;</td><td>%2</td></tr>")
                     .arg(command->action->shortcut().toString(QKeySequence::NativeText),
                          command->action->text().remove('&').toHtmlEscaped());
+    const std::pair<QString, QString> ofWidgets[] = {
+        {"Esc", tr("In a field: back to the value of the setup")},
+        {tr("Up, Down"), tr("In a date: count the part at the cursor")},
+        {"F2", tr("In a table: edit the cell")},
+        {"Ctrl+D", tr("In a table: fill down")},
+        {tr("Del"), tr("In a table: clear texts")},
+        {"Ctrl+Insert", tr("In a table: insert a row")},
+        {"Ctrl+Del", tr("In a table: delete the row")},
+        {tr("Ctrl+Up, Ctrl+Down"), tr("In a table: move the row")},
+    };
+    for (const auto& [key, what] : ofWidgets)
+      rows += QString("<tr><td>%1&nbsp;&nbsp;</td><td>%2</td></tr>").arg(key, what);
     QMessageBox::information(this, tr("Keys"), "<table>" + rows + "</table>");
   });
   keys_ = keys.action;

@@ -175,7 +175,7 @@ void PageView::AddRow(Form& built, const std::vector<Control*>& row) {
     // The label stands at the height of the field's first line.
     label->setContentsMargins(0, Theme::Get().Scaled(4), 0, 0);
     grid.addWidget(label, line, kLabelColumn, Qt::AlignLeft | Qt::AlignTop);
-    grid.addWidget(cell, line, kFieldColumn);
+    grid.addWidget(cell, line, kFieldColumn, growsDown ? Qt::Alignment() : Qt::AlignTop);
   } else {
     // The first stands in the place of a label, or with its own in front; the others follow it.
     auto* others = new QHBoxLayout;
@@ -266,7 +266,7 @@ void PageView::FocusOn(const std::string& key) {
   });
   if (found == widgets_.end()) found = std::ranges::find_if(widgets_, takesKeyboard);
   if (found == widgets_.end()) return;
-  (*found)->FocusTarget()->setFocus(Qt::OtherFocusReason);
+  (*found)->FocusTarget()->setFocus(Qt::ShortcutFocusReason);
   scroll_->ensureWidgetVisible((*found)->Field());
 }
 

@@ -200,11 +200,14 @@ TableView::TableView(CYbSEDlgBase& page, Control& control) : page_(page), contro
     connect(made, &QToolButton::clicked, this, [this, action] { ChangeRows(action); });
     return made;
   };
-  insert_ = button("insert", tr("Insert"), tr("Insert rows above the selected ones, or one at the end (Ctrl+Insert)"),
+  insert_ = button("insert", tr("Insert"),
+                   tr("Insert rows above the selected ones, or one at the end (Ctrl+Insert: above the current cell)"),
                    RowAction::Insert);
-  delete_ = button("delete", tr("Delete"), tr("Delete the selected rows (Ctrl+Delete)"), RowAction::Delete);
-  up_ = button("up", tr("Up"), tr("Move the selected rows up (Ctrl+Up)"), RowAction::MoveUp);
-  down_ = button("down", tr("Down"), tr("Move the selected rows down (Ctrl+Down)"), RowAction::MoveDown);
+  delete_ = button("delete", tr("Delete"), tr("Delete the selected rows (Ctrl+Delete: that of the current cell)"),
+                   RowAction::Delete);
+  up_ = button("up", tr("Up"), tr("Move the selected rows up (Ctrl+Up: that of the current cell)"), RowAction::MoveUp);
+  down_ = button("down", tr("Down"), tr("Move the selected rows down (Ctrl+Down: that of the current cell)"),
+                 RowAction::MoveDown);
   message_ = new QLabel;
   message_->setWordWrap(true);
   bar->addSpacing(theme.Scaled(12));
@@ -257,6 +260,7 @@ QWidget* TableView::FocusTarget() const { return view_; }
 
 void TableView::Sync() {
   model_->Sync();
+  message_->clear();
   if (!view_->currentIndex().isValid() && model_->rowCount() > 0)
     view_->selectionModel()->setCurrentIndex(model_->index(0, 0), QItemSelectionModel::NoUpdate);
   SyncButtons();
@@ -333,7 +337,7 @@ void TableView::Paste() {
   const CellRange cells = Selected().value_or(CellRange{});
   if (!text.isEmpty()) {
     const CellsResult result = page_.Paste(control_, cells, FromQt(text));
-    Tell(result, tr("%n cell(s) pasted.", nullptr, result.taken));
+    Tell(result, tr("Cells pasted: %1").arg(result.taken));
     if (result.taken > 0)
       view_->selectionModel()->select(
           QItemSelection(model_->index(result.cells.firstRow - 1, result.cells.firstColumn - 1),
@@ -346,7 +350,7 @@ void TableView::FillDown() {
   const auto cells = Selected();
   if (!cells) return;
   const CellsResult result = page_.FillDown(control_, *cells);
-  Tell(result, tr("%n cell(s) filled.", nullptr, result.taken));
+  Tell(result, tr("Cells filled: %1").arg(result.taken));
 }
 
 void TableView::ClearCells() {
@@ -355,7 +359,8 @@ void TableView::ClearCells() {
 
 void TableView::Tell(const CellsResult& result, const QString& done) {
   message_->setText(done);
-  if (result.refused > 0) page_.Outside().Tell(result.Message(), Host::Icon::Warning);
+  if (result.refused == 0) return;
+  page_.Outside().Tell(FromQt(tr("These cells kept their values:")) + "\n\n" + result.Message(), Host::Icon::Warning);
 }
 
 bool TableView::eventFilter(QObject* watched, QEvent* event) {

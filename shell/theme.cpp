@@ -52,7 +52,7 @@ QPalette DarkPalette() {
   palette.setColor(QPalette::Link, QColor(0x6c, 0xb6, 0xe8));
   palette.setColor(QPalette::PlaceholderText, QColor(0x93, 0x9a, 0xa5));
   for (const auto role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText})
-    palette.setColor(QPalette::Disabled, role, QColor(0x79, 0x80, 0x8b));
+    palette.setColor(QPalette::Disabled, role, QColor(0x8f, 0x96, 0xa1));
   palette.setColor(QPalette::Disabled, QPalette::Base, QColor(0x28, 0x2c, 0x32));
   return palette;
 }
