@@ -313,29 +313,32 @@ class Triangular {
     const double step = std::exp2(std::ceil(std::log2(extent / static_cast<double>(kLatticeSize - 1))));
     struct Placed {
       LatticePoint place;
-      double z;
+      ScatteredPoint point;
     };
     std::vector<Placed> placed;
     placed.reserve(points.size());
     const auto onLattice = [step](double offset) { return static_cast<std::int64_t>(std::llround(offset / step)); };
     for (const ScatteredPoint& point : points) {
-      placed.push_back({{onLattice(point.x - xMin), onLattice(point.y - yMin)}, point.z});
+      placed.push_back({{onLattice(point.x - xMin), onLattice(point.y - yMin)}, point});
     }
     std::sort(placed.begin(), placed.end(), [](const Placed& a, const Placed& b) {
       return a.place.x != b.place.x   ? a.place.x < b.place.x
              : a.place.y != b.place.y ? a.place.y < b.place.y
-                                      : a.z < b.z;
+                                      : a.point.z < b.point.z;
     });
     lattice_.reserve(placed.size());
     points_.reserve(placed.size());
     for (std::size_t first = 0, last = 0; first < placed.size(); first = last) {
-      double sum = 0;
-      for (; last < placed.size() && placed[last].place == placed[first].place; ++last) sum += placed[last].z;
-      const LatticePoint place = placed[first].place;
-      lattice_.push_back(place);
-      const MapPoint cells =
-          transform.ToCells({xMin + static_cast<double>(place.x) * step, yMin + static_cast<double>(place.y) * step});
-      points_.push_back({cells.x, cells.y, sum / static_cast<double>(last - first)});
+      ScatteredPoint sum;
+      for (; last < placed.size() && placed[last].place == placed[first].place; ++last) {
+        const ScatteredPoint& point = placed[last].point;
+        sum = {sum.x + point.x, sum.y + point.y, sum.z + point.z};
+      }
+      // The lattice decides who is whose neighbour; the planes go through the points themselves.
+      const auto count = static_cast<double>(last - first);
+      const MapPoint cells = transform.ToCells({sum.x / count, sum.y / count});
+      lattice_.push_back(placed[first].place);
+      points_.push_back({cells.x, cells.y, sum.z / count});
     }
     merged_ = placed.size() - lattice_.size();
     // Where points stand at the centres of cells, rounding must not put the outermost of them outside the hull.
@@ -351,7 +354,7 @@ class Triangular {
     // will.
     const double longest2 =
         std::max({bx * bx + by * by, cx * cx + cy * cy, (cx - bx) * (cx - bx) + (cy - by) * (cy - by)});
-    if (turn * turn < tolerance_ * tolerance_ / 16 * longest2) return;
+    if (turn * turn < tolerance_ * tolerance_ / 4 * longest2) return;
     // A plane leaves the range of its corners only through rounding.
     const auto [least, most] = std::minmax({a.z, b.z, c.z});
     for (int j = first; j <= last; ++j) {
