@@ -8,6 +8,7 @@
 #include <cmath>
 #include <cstdio>
 #include <cstring>
+#include <fstream>
 #include <limits>
 #include <memory>
 #include <new>
@@ -646,6 +647,30 @@ Reason MakeShapes(ShapeKind kind, const std::vector<Shape>& shapes, const UnitCo
   return {};
 }
 
+struct NamedBytes {
+  std::string path;
+  std::string_view bytes;
+};
+
+/// Writes all files beside their targets before the first takes its place, so that a full disk leaves all as they were.
+FileResult WriteSet(const std::vector<NamedBytes>& set) {
+  std::vector<FileReplacement> replacements(set.size());
+  for (std::size_t i = 0; i < set.size(); ++i) {
+    if (FileResult begun = replacements[i].Begin(set[i].path); !begun.Ok()) return begun;
+    std::ofstream stream(NativePath(replacements[i].TemporaryPath()), std::ios::binary);
+    stream.write(set[i].bytes.data(), static_cast<std::streamsize>(set[i].bytes.size()));
+    stream.close();
+    if (!stream) return {fmt::format("cannot write {}: the disk may be full; nothing was written", set[i].path), {}};
+  }
+  FileResult result;
+  for (FileReplacement& replacement : replacements) {
+    const FileResult written = replacement.Commit();
+    if (!written.Ok()) return written;
+    if (!written.note.empty()) AddNote(result.note, written.note);
+  }
+  return result;
+}
+
 }  // namespace
 
 bool CTvnShapeData::GetTranscribingRect(Envelope& rectangle) const {
@@ -697,22 +722,14 @@ FileResult CTvnShapeData::SaveShapeFile(const std::string& path) const {
   if (!reason.empty()) return refused(reason);
 
   const std::string base = path.substr(0, path.size() - 4);
-  const std::string prj = base + ".prj";
-  FileResult result;
-  const auto write = [&result](const std::string& name, std::string_view content) {
-    if (!result.Ok()) return;
-    FileResult written = WriteFileAtomically(name, content);
-    result.error = written.error;
-    if (!written.note.empty()) AddNote(result.note, written.note);
-  };
-  write(base + ".dbf", files.dbf.written);
-  write(base + ".cpg", files.cpg.written);
-  if (!projection_.empty())
-    write(prj, projection_);
-  else if (FileExists(prj))
-    AddNote(result.note, fmt::format("{} was there and still tells the projection", prj));
-  write(base + ".shx", files.shx.written);
-  write(path, files.shp.written);
+  std::vector<NamedBytes> set = {{base + ".dbf", files.dbf.written}, {base + ".cpg", files.cpg.written}};
+  if (!projection_.empty()) set.push_back({base + ".prj", projection_});
+  set.push_back({base + ".shx", files.shx.written});
+  set.push_back({path, files.shp.written});
+  FileResult result = WriteSet(set);
+  if (result.Ok() && projection_.empty() && FileExists(base + ".prj")) {
+    AddNote(result.note, fmt::format("{}.prj was there and still tells the projection", base));
+  }
   return result;
 }
 

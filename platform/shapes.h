@@ -102,9 +102,9 @@ class CTvnShapeData : public CYbShapeData {
   void AddShape(Shape shape) { shapes_.push_back(std::move(shape)); }
 
   /// Writes .shp, .shx, .dbf (with a running number ID where there are no columns), .cpg and, with a projection, .prj,
-  /// the coordinates in the axis unit. Each file takes its place in one step, the .shp last. What cannot be stored (a
-  /// text of more than 254 bytes, a value that does not fit its column, a number that is none) is an error that names
-  /// the shape, and nothing is written.
+  /// the coordinates in the axis unit. All are written beside their targets before the first takes its place, the .shp
+  /// last. What cannot be stored (a text of more than 254 bytes, a value that does not fit its column, a number that is
+  /// none) is an error that names the shape, and nothing is written.
   FileResult SaveShapeFile(const std::string& path) const;
 };
 

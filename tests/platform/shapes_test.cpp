@@ -216,6 +216,21 @@ TEST(Shapes, ThatCannotBeStoredAreNot) {
   }
 }
 
+TEST(Shapes, LeaveEveryOldFileWhenOneCannotBeWritten) {
+  const test::TempFolder folder;
+  const std::string path = Save(folder, Zones());
+  const std::string shapes = test::ReadFile(path), table = test::ReadFile(folder.File("zones.dbf"));
+  // A folder stands where the index is to be written, which is the last file but one.
+  std::filesystem::remove(folder.File("zones.shx"));
+  std::filesystem::create_directory(folder.File("zones.shx"));
+  CTvnShapeData other;
+  EXPECT_THAT(other.SaveShapeFile(path).error, HasSubstr("zones.shx"));
+  EXPECT_EQ(test::ReadFile(path), shapes);
+  EXPECT_EQ(test::ReadFile(folder.File("zones.dbf")), table);
+  const auto files = std::filesystem::directory_iterator(folder.Path());
+  EXPECT_EQ(std::distance(begin(files), end(files)), 5);
+}
+
 TEST(Shapes, HaveValuesAsTexts) {
   EXPECT_EQ(TextOf(ShapeValue("zone  ")), "zone");
   EXPECT_EQ(TextOf(ShapeValue(" ")), "");
