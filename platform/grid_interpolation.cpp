@@ -16,7 +16,6 @@
 
 #include "platform/delaunay.h"
 #include "platform/row_workers.h"
-#include "platform/shapes.h"
 
 namespace tervane {
 namespace {
@@ -401,8 +400,6 @@ class Triangular {
   double tolerance_ = 0;
 };
 
-constexpr const char* kCancelled = "the interpolation was cancelled";
-
 std::string WhyNot(const std::vector<ScatteredPoint>& points, const GridGeometry& geometry,
                    const InterpolationOptions& options) {
   if (std::string problem = geometry.Problem(); !problem.empty()) return problem;
@@ -441,7 +438,9 @@ FileResult InterpolateChecked(std::vector<ScatteredPoint> points, const GridGeom
     return ForRows(geometry.ny, rowsAtOnce, options.threads, options.progress, options.cancel,
                    [&](int begin, int end) { method.Rows(begin, end, target); });
   };
+  // Many points within reach make a row slow, and a user who cancels should not wait for several.
   constexpr int kFewRows = 8;
+  constexpr std::size_t kManyPoints = 100'000;
   FileResult result;
   bool isDone = false;
   switch (options.method) {
@@ -462,10 +461,11 @@ FileResult InterpolateChecked(std::vector<ScatteredPoint> points, const GridGeom
       break;
     }
     default:
-      isDone = run(kFewRows, InverseDistance(std::move(points), radius,
-                                             options.method == InterpolationMethod::InverseDistanceSquared));
+      isDone = run(
+          points.size() > kManyPoints ? 1 : kFewRows,
+          InverseDistance(std::move(points), radius, options.method == InterpolationMethod::InverseDistanceSquared));
   }
-  if (!isDone) return {kCancelled, {}};
+  if (!isDone) return {"the interpolation was cancelled", {}};
   return result;
 }
 
@@ -480,80 +480,6 @@ FileResult Interpolate(std::vector<ScatteredPoint> points, const GridGeometry& g
     result.error = "there is no memory for the interpolation";
   }
   if (!result.Ok()) values.clear();
-  return result;
-}
-
-FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoint>& points) {
-  points.clear();
-  const auto refused = [&](std::string_view reason) {
-    points.clear();
-    return FileResult{fmt::format("cannot use {}: {}", file.path, reason), {}};
-  };
-  const Unit* const axisUnit = FindUnit(file.axisUnit);
-  if (!axisUnit || axisUnit->scale.dimension != Dimension::Length) {
-    return refused(fmt::format("the unit {} of its coordinates is no length", file.axisUnit));
-  }
-  UnitConversion toBase;
-  if (const ItemType* const itemType = FindItemType(file.itemType); itemType && file.itemType != kUndefinedItemType) {
-    if (!AllowsUnit(*itemType, file.itemUnit)) {
-      return refused(fmt::format("the unit {} of its values is none of {}", file.itemUnit, itemType->name));
-    }
-    toBase = *ConversionBetween(FindUnit(file.itemUnit)->scale, BaseUnit(*itemType).scale);
-  }
-  FileResult result;
-  if (file.isXyz) {
-    result = ReadXyzFile(file.path, points);
-    const UnitConversion toMetres = *ConversionBetween(axisUnit->scale, UnitScale{Dimension::Length});
-    for (ScatteredPoint& point : points) point = {toMetres(point.x), toMetres(point.y), toBase(point.z)};
-    return result;
-  }
-  CYbShapeData shapes;
-  shapes.SetAxisLengthUnit(file.axisUnit);
-  const bool isHeight = file.attribute.empty();
-  result = isHeight ? shapes.ReadShapeFile(file.path) : shapes.ReadShapeAndDbfFile(file.path, file.attribute);
-  if (!result.Ok()) return result;
-  if (shapes.Kind() == ShapeKind::Polygon) return refused("points or lines were expected, the file holds polygons");
-  if (!isHeight && shapes.Columns().front().kind == AttributeKind::Text) {
-    return refused(fmt::format("attribute {} is text, a number was expected", shapes.Columns().front().name));
-  }
-  std::size_t left = 0;
-  for (const Shape& shape : shapes.GetData()) {
-    if (isHeight ? shape.z.empty() : !shape.HasValue()) {
-      left += !shape.points.empty();
-      continue;
-    }
-    double value = 0;
-    if (!isHeight) {
-      const auto* const whole = std::get_if<std::int64_t>(&shape.Value());
-      value = whole ? static_cast<double>(*whole) : std::get<double>(shape.Value());
-    }
-    for (std::size_t i = 0; i < shape.points.size(); ++i) {
-      points.push_back({shape.points[i].x, shape.points[i].y, toBase(isHeight ? shape.z[i] : value)});
-    }
-  }
-  if (points.empty()) return refused("no shape has both points and a value");
-  if (left > 0) {
-    result.note += fmt::format("{}{} shapes without a value are left out", result.note.empty() ? "" : "; ", left);
-  }
-  return result;
-}
-
-FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS(GridGeometry geometry, float deleteValue,
-                                                          const ScatteredFile& file,
-                                                          const InterpolationOptions& options) {
-  std::vector<ScatteredPoint> points;
-  FileResult read = ReadScatteredFile(file, points);
-  if (!read.Ok()) return read;
-  std::vector<float> values;
-  FileResult result = Interpolate(std::move(points), geometry, deleteValue, options, values);
-  const auto* const itemType = FindItemType(file.itemType);
-  const int unit = itemType ? BaseUnit(*itemType).key : file.itemUnit;
-  if (result.Ok()) result.error = TakeValues(std::move(geometry), std::move(values), deleteValue, unit, file.itemType);
-  if (!result.Ok()) {
-    if (result.error != kCancelled) result.error = fmt::format("cannot use {}: {}", file.path, result.error);
-    return result;
-  }
-  if (!read.note.empty()) result.note = read.note + (result.note.empty() ? "" : "; ") + result.note;
   return result;
 }
 

@@ -25,9 +25,8 @@ int FirstCentre(double limit, int count) {
 PolygonRaster::PolygonRaster(const GridGeometry& geometry)
     : nx_(geometry.nx), ny_(geometry.ny), transform_(geometry), rowStarts_(static_cast<std::size_t>(ny_) + 1) {}
 
-const std::vector<PolygonRaster::Span>& PolygonRaster::Spans(const Shape& shape, std::size_t first, std::size_t last) {
-  crossings_.clear();
-  int lowest = ny_, highest = -1;
+template <class Found>
+void PolygonRaster::ForEdges(const Shape& shape, std::size_t first, std::size_t last, const Found& found) const {
   for (std::size_t part = first; part < last; ++part) {
     const std::size_t begin = shape.parts[part], end = shape.PartEnd(part);
     if (begin == end) continue;
@@ -39,35 +38,58 @@ const std::vector<PolygonRaster::Span>& PolygonRaster::Spans(const Shape& shape,
       const MapPoint low = isUp ? before : point, high = isUp ? point : before;
       before = point;
       const int rowBegin = FirstCentre(low.y, ny_), rowEnd = FirstCentre(high.y, ny_);
-      if (rowBegin == rowEnd) continue;
-      const double slope = (high.x - low.x) / (high.y - low.y);
-      for (int j = rowBegin; j < rowEnd; ++j) crossings_.push_back({j, low.x + (j + 0.5 - low.y) * slope});
-      lowest = std::min(lowest, rowBegin);
-      highest = std::max(highest, rowEnd - 1);
+      if (rowBegin < rowEnd) found(low, high, rowBegin, rowEnd);
     }
   }
+}
+
+const std::vector<PolygonRaster::Span>& PolygonRaster::Spans(const Shape& shape, std::size_t first, std::size_t last) {
+  spans_.clear();
+  std::size_t crossings = 0;
+  int lowest = ny_, highest = 0;
+  ForEdges(shape, first, last, [&](MapPoint, MapPoint, int rowBegin, int rowEnd) {
+    crossings += static_cast<std::size_t>(rowEnd - rowBegin);
+    lowest = std::min(lowest, rowBegin);
+    highest = std::max(highest, rowEnd);
+  });
+  if (crossings == 0) return spans_;
+  // A polygon that goes to and fro over a large grid crosses more rows than there is memory for at once.
+  constexpr std::size_t kMostCrossings = 10'000'000;
+  const auto bands = static_cast<int>(std::min(crossings / kMostCrossings + 1, static_cast<std::size_t>(ny_)));
+  const int bandRows = (highest - lowest) / bands + 1;
+  for (int begin = lowest; begin < highest; begin += bandRows) {
+    AddSpans(shape, first, last, begin, std::min(highest, begin + bandRows));
+  }
+  return spans_;
+}
+
+void PolygonRaster::AddSpans(const Shape& shape, std::size_t first, std::size_t last, int begin, int end) {
+  crossings_.clear();
+  ForEdges(shape, first, last, [&](MapPoint low, MapPoint high, int rowBegin, int rowEnd) {
+    const double slope = (high.x - low.x) / (high.y - low.y);
+    for (int j = std::max(begin, rowBegin); j < std::min(end, rowEnd); ++j) {
+      crossings_.push_back({j, low.x + (j + 0.5 - low.y) * slope});
+    }
+  });
 
   // Sorted by row with one count, then within each row.
-  spans_.clear();
-  if (crossings_.empty()) return spans_;
-  const auto rows = static_cast<std::size_t>(highest - lowest + 1);
+  const auto rows = static_cast<std::size_t>(end - begin);
   std::fill(rowStarts_.begin(), rowStarts_.begin() + static_cast<std::ptrdiff_t>(rows) + 1, std::size_t{0});
-  const auto rowOf = [lowest](const Crossing& crossing) { return static_cast<std::size_t>(crossing.j - lowest); };
+  const auto rowOf = [begin](const Crossing& crossing) { return static_cast<std::size_t>(crossing.j - begin); };
   for (const Crossing& crossing : crossings_) ++rowStarts_[rowOf(crossing) + 1];
   for (std::size_t row = 0; row < rows; ++row) rowStarts_[row + 1] += rowStarts_[row];
   sorted_.resize(crossings_.size());
   for (const Crossing& crossing : crossings_) sorted_[rowStarts_[rowOf(crossing)]++] = crossing;
   // Each start has moved to the start of the next row.
   for (std::size_t row = 0, at = 0; row < rows; at = rowStarts_[row++]) {
-    const auto begin = sorted_.begin() + static_cast<std::ptrdiff_t>(at);
-    const auto end = sorted_.begin() + static_cast<std::ptrdiff_t>(rowStarts_[row]);
-    std::sort(begin, end, [](const Crossing& a, const Crossing& b) { return a.x < b.x; });
-    for (auto it = begin; it + 1 < end; it += 2) {
+    const auto rowBegin = sorted_.begin() + static_cast<std::ptrdiff_t>(at);
+    const auto rowEnd = sorted_.begin() + static_cast<std::ptrdiff_t>(rowStarts_[row]);
+    std::sort(rowBegin, rowEnd, [](const Crossing& a, const Crossing& b) { return a.x < b.x; });
+    for (auto it = rowBegin; it + 1 < rowEnd; it += 2) {
       const int from = FirstCentre(it->x, nx_), to = FirstCentre((it + 1)->x, nx_);
       if (from < to) spans_.push_back({it->j, from, to});
     }
   }
-  return spans_;
 }
 
 void PutPolygons(const std::vector<Shape>& shapes, const std::vector<float>& codes, const GridGeometry& geometry,

@@ -53,6 +53,12 @@ class PolygonRaster {
     int j;
     double x;
   };
+  /// Calls `found(low, high, rowBegin, rowEnd)` for each edge that crosses centres of rows, from its lower end.
+  template <class Found>
+  void ForEdges(const Shape& shape, std::size_t first, std::size_t last, const Found& found) const;
+  /// Adds the spans of rows [begin, end).
+  void AddSpans(const Shape& shape, std::size_t first, std::size_t last, int begin, int end);
+
   int nx_, ny_;
   GridTransform transform_;
   std::vector<Crossing> crossings_, sorted_;

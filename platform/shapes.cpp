@@ -3,13 +3,9 @@
 #include "platform/shapes.h"
 
 #include <algorithm>
-#include <array>
 #include <charconv>
 #include <cmath>
-#include <cstdio>
-#include <cstring>
-#include <fstream>
-#include <limits>
+#include <functional>
 #include <memory>
 #include <new>
 #include <string_view>
@@ -18,162 +14,14 @@
 #include <shapefil.h>
 
 #include "platform/paths.h"
+#include "platform/shapelib_memory.h"
 #include "platform/text.h"
 #include "platform/text_fields.h"
 
 namespace tervane {
 namespace {
 
-// ---- Shapelib works on memory: so a file is read as every other one (no waiting for a FIFO, errors in words), nothing
-// is half written, and an index can be made without touching the user's folder.
-
-struct MemoryFile {
-  std::string_view read;  ///< Of a file that is only read.
-  std::string written;
-  bool isWritable = false;
-  bool exists = false;
-
-  std::string_view Content() const { return isWritable ? std::string_view(written) : read; }
-};
-
-/// The files of one shape file. Shapelib's hooks carry no context, so that they find it by the thread.
-struct MemoryFiles {
-  MemoryFile shp, shx, dbf, cpg;
-  std::string firstMessage;  ///< Of Shapelib, since it was last emptied.
-
-  MemoryFile* Find(std::string_view name) {
-    if (name.ends_with(".shp")) return &shp;
-    if (name.ends_with(".shx")) return &shx;
-    if (name.ends_with(".dbf")) return &dbf;
-    return name.ends_with(".cpg") ? &cpg : nullptr;
-  }
-};
-
-thread_local MemoryFiles* currentFiles = nullptr;
-
-class MemoryFilesScope {
- public:
-  explicit MemoryFilesScope(MemoryFiles& files) : before_(currentFiles) { currentFiles = &files; }
-  ~MemoryFilesScope() { currentFiles = before_; }
-  MemoryFilesScope(const MemoryFilesScope&) = delete;
-  MemoryFilesScope& operator=(const MemoryFilesScope&) = delete;
-
- private:
-  MemoryFiles* before_;
-};
-
-struct OpenMemoryFile {
-  MemoryFile* file;
-  std::size_t position = 0;
-};
-
-OpenMemoryFile& Opened(SAFile file) { return *static_cast<OpenMemoryFile*>(static_cast<void*>(file)); }
-
-SAFile OpenHook(const char* name, const char* access) {
-  MemoryFile* const file = currentFiles->Find(name);
-  if (!file) return nullptr;
-  if (access[0] == 'w') *file = {{}, {}, true, true};
-  if (!file->exists) return nullptr;
-  return static_cast<SAFile>(static_cast<void*>(new OpenMemoryFile{file}));
-}
-
-SAOffset ReadHook(void* target, SAOffset size, SAOffset count, SAFile handle) {
-  OpenMemoryFile& open = Opened(handle);
-  const std::string_view content = open.file->Content();
-  if (size == 0 || open.position >= content.size()) return 0;
-  const SAOffset whole = std::min<SAOffset>(count, (content.size() - open.position) / size);
-  std::memcpy(target, content.data() + open.position, whole * size);
-  open.position += whole * size;
-  return whole;
-}
-
-SAOffset WriteHook(void* source, SAOffset size, SAOffset count, SAFile handle) {
-  OpenMemoryFile& open = Opened(handle);
-  if (!open.file->isWritable) return 0;
-  std::string& content = open.file->written;
-  content.resize(std::max(content.size(), open.position + size * count));
-  std::memcpy(content.data() + open.position, source, size * count);
-  open.position += size * count;
-  return count;
-}
-
-SAOffset SeekHook(SAFile handle, SAOffset offset, int whence) {
-  OpenMemoryFile& open = Opened(handle);
-  // Unsigned arithmetic also goes back: a negative offset wraps around.
-  open.position = offset + (whence == SEEK_CUR ? open.position : whence == SEEK_END ? open.file->Content().size() : 0);
-  return 0;
-}
-
-SAOffset TellHook(SAFile handle) { return Opened(handle).position; }
-int FlushHook(SAFile) { return 0; }
-int CloseHook(SAFile handle) {
-  delete &Opened(handle);
-  return 0;
-}
-int RemoveHook(const char* name) {
-  if (MemoryFile* const file = currentFiles->Find(name)) *file = {};
-  return 0;
-}
-void ErrorHook(const char* message) {
-  if (currentFiles->firstMessage.empty()) currentFiles->firstMessage = Trimmed(message);
-}
-double NumberHook(const char* text) {
-  double number = 0;
-  const std::string_view trimmed = Trimmed(text);
-  std::from_chars(trimmed.data(), trimmed.data() + trimmed.size(), number);
-  return number;
-}
-
-SAHooks* Hooks() {
-  static SAHooks hooks{OpenHook,  ReadHook,  WriteHook,  SeekHook,  TellHook,
-                       FlushHook, CloseHook, RemoveHook, ErrorHook, NumberHook};
-  return &hooks;
-}
-
-struct Closer {
-  void operator()(SHPInfo* file) const { SHPClose(file); }
-  void operator()(DBFInfo* file) const { DBFClose(file); }
-  void operator()(SHPObject* object) const { SHPDestroyObject(object); }
-};
-using ShapeHandle = std::unique_ptr<SHPInfo, Closer>;
-using TableHandle = std::unique_ptr<DBFInfo, Closer>;
-using ObjectHandle = std::unique_ptr<SHPObject, Closer>;
-
-// ---- Kinds
-
-struct KindRow {
-  int type;
-  ShapeKind kind;
-  bool hasZ, hasM;
-};
-constexpr KindRow kKinds[] = {
-    {SHPT_POINT, ShapeKind::Point, false, false},
-    {SHPT_POINTZ, ShapeKind::Point, true, true},
-    {SHPT_POINTM, ShapeKind::Point, false, true},
-    {SHPT_ARC, ShapeKind::Line, false, false},
-    {SHPT_ARCZ, ShapeKind::Line, true, true},
-    {SHPT_ARCM, ShapeKind::Line, false, true},
-    {SHPT_POLYGON, ShapeKind::Polygon, false, false},
-    {SHPT_POLYGONZ, ShapeKind::Polygon, true, true},
-    {SHPT_POLYGONM, ShapeKind::Polygon, false, true},
-    {SHPT_MULTIPOINT, ShapeKind::MultiPoint, false, false},
-    {SHPT_MULTIPOINTZ, ShapeKind::MultiPoint, true, true},
-    {SHPT_MULTIPOINTM, ShapeKind::MultiPoint, false, true},
-};
-
-const KindRow* FindKind(int type) {
-  const auto* const found =
-      std::find_if(std::begin(kKinds), std::end(kKinds), [=](const KindRow& row) { return row.type == type; });
-  return found == std::end(kKinds) ? nullptr : found;
-}
-
-constexpr std::array<const char*, 4> kKindNames = {"points", "lines", "polygons", "points"};
-constexpr std::array<const char*, 3> kAttributeNames = {"text", "a whole number", "a real number"};
-
-const char* NameOf(ShapeKind kind) { return kKindNames[static_cast<std::size_t>(kind)]; }
-const char* NameOf(AttributeKind kind) { return kAttributeNames[static_cast<std::size_t>(kind)]; }
-
-// ---- Reading
+using namespace shapelib;
 
 using Reason = std::string;
 
@@ -222,11 +70,6 @@ std::string AsUtf8(std::string_view text, bool& isOther) {
     }
   }
   return utf8;
-}
-
-void AddNote(std::string& note, std::string_view text) {
-  if (!note.empty()) note += "; ";
-  note += text;
 }
 
 class ShapeFileReader {
@@ -446,11 +289,6 @@ class ShapeFileReader {
   bool isOtherText_ = false;
 };
 
-const Unit* FindLengthUnit(int key) {
-  const Unit* const unit = FindUnit(key);
-  return unit && unit->scale.dimension == Dimension::Length ? unit : nullptr;
-}
-
 }  // namespace
 
 std::string TextOf(const ShapeValue& value) {
@@ -525,212 +363,6 @@ FileResult CheckShapeFile(const std::string& path, const ShapeRequest& request, 
             {}};
   }
   return {{}, reader.note};
-}
-
-// ---- Writing
-
-namespace {
-
-constexpr std::size_t kMostTextBytes = 254;
-
-/// The text of a value in its column, or why it cannot stand there.
-Reason StoredText(const ShapeField& field, const ShapeValue& value, std::string& text) {
-  text.clear();
-  if (std::holds_alternative<std::monostate>(value)) return {};
-  const auto* const asText = std::get_if<std::string>(&value);
-  const auto* const asWhole = std::get_if<std::int64_t>(&value);
-  const auto* const asReal = std::get_if<double>(&value);
-  if (field.kind == AttributeKind::Text && asText) {
-    text = *asText;
-    if (text.size() > kMostTextBytes)
-      return fmt::format("the text of {} has {} bytes; a table holds {}", field.name, text.size(), kMostTextBytes);
-    if (text.find('\0') != std::string::npos)
-      return fmt::format("the text of {} contains a zero character", field.name);
-    return {};
-  }
-  if (field.kind == AttributeKind::Whole && asWhole) {
-    text = fmt::format("{}", *asWhole);
-    return text.size() > 18 ? fmt::format("{} is {}; a table holds 18 digits", field.name, *asWhole) : Reason();
-  }
-  if (field.kind == AttributeKind::Real && (asReal || asWhole)) {
-    const double real = asReal ? *asReal : static_cast<double>(*asWhole);
-    if (!std::isfinite(real)) return fmt::format("{} is {}, which is no number", field.name, real);
-    text = ShortestNumber(real);
-    return {};
-  }
-  return fmt::format("the value of {} is not {}", field.name, NameOf(field.kind));
-}
-
-/// Makes the bytes of the table.
-Reason MakeTable(const std::vector<ShapeField>& columns, const std::vector<Shape>& shapes) {
-  // The texts first: how wide a column must be is known only then.
-  std::vector<std::vector<std::string>> texts(columns.size(), std::vector<std::string>(shapes.size()));
-  const TableHandle table(DBFCreateLL("memory.dbf", "UTF-8", Hooks()));
-  if (!table) return "no table can be made";
-  for (std::size_t c = 0; c < columns.size(); ++c) {
-    const ShapeField& field = columns[c];
-    if (field.name.empty() || field.name.size() > XBASE_FLDNAME_LEN_WRITE) {
-      return fmt::format("the name of the attribute \"{}\" has {} bytes; 1 to 10 can be stored", field.name,
-                         field.name.size());
-    }
-    std::size_t width = field.kind == AttributeKind::Text ? 1 : field.kind == AttributeKind::Whole ? 9 : 24;
-    for (std::size_t i = 0; i < shapes.size(); ++i) {
-      if (shapes[i].values.size() != columns.size()) {
-        return fmt::format("shape {} has {} values for {} attributes", i + 1, shapes[i].values.size(), columns.size());
-      }
-      if (const Reason reason = StoredText(field, shapes[i].values[c], texts[c][i]); !reason.empty())
-        return fmt::format("shape {}: {}", i + 1, reason);
-      width = std::max(width, texts[c][i].size());
-    }
-    const bool isReal = field.kind == AttributeKind::Real;
-    if (DBFAddNativeFieldType(table.get(), field.name.c_str(), field.kind == AttributeKind::Text ? 'C' : 'N',
-                              static_cast<int>(width), isReal ? 15 : 0) < 0) {
-      return fmt::format("the attribute {} does not fit into the table", field.name);
-    }
-  }
-  for (std::size_t i = 0; i < shapes.size(); ++i) {
-    for (std::size_t c = 0; c < columns.size(); ++c) {
-      const int row = static_cast<int>(i), column = static_cast<int>(c);
-      std::string& text = texts[c][i];
-      const bool isStored = text.empty() ? DBFWriteNULLAttribute(table.get(), row, column)
-                                         : DBFWriteAttributeDirectly(table.get(), row, column, text.data());
-      if (!isStored) return fmt::format("shape {}: its attributes cannot be stored", i + 1);
-    }
-  }
-  return {};
-}
-
-int FileType(ShapeKind kind, bool hasZ, bool hasM) {
-  for (const KindRow& row : kKinds) {
-    if (row.kind == kind && row.hasZ == hasZ && row.hasM == (hasM || hasZ)) return row.type;
-  }
-  return SHPT_NULL;
-}
-
-/// Makes the bytes of shapes and index.
-Reason MakeShapes(ShapeKind kind, const std::vector<Shape>& shapes, const UnitConversion& fromMetres) {
-  const bool hasZ = std::any_of(shapes.begin(), shapes.end(), [](const Shape& shape) { return !shape.z.empty(); });
-  const bool hasM = std::any_of(shapes.begin(), shapes.end(), [](const Shape& shape) { return !shape.m.empty(); });
-  const int type = FileType(kind, hasZ, hasM);
-  const ShapeHandle file(SHPCreateLL("memory.shp", type, Hooks()));
-  if (!file) return "no shape file can be made";
-  std::vector<double> x, y;
-  std::vector<int> parts;
-  for (std::size_t i = 0; i < shapes.size(); ++i) {
-    const Shape& shape = shapes[i];
-    const auto isFit = [&](const std::vector<double>& more) {
-      return more.empty() || more.size() == shape.points.size();
-    };
-    if (!isFit(shape.z) || !isFit(shape.m)) return fmt::format("shape {} has not one z and m for each point", i + 1);
-    if (kind == ShapeKind::Point && shape.points.size() > 1)
-      return fmt::format("shape {} has {} points in a file of single ones", i + 1, shape.points.size());
-    x.clear();
-    y.clear();
-    for (const MapPoint point : shape.points) {
-      x.push_back(fromMetres(point.x));
-      y.push_back(fromMetres(point.y));
-      if (!std::isfinite(x.back()) || !std::isfinite(y.back()))
-        return fmt::format("shape {} has a point that is no number", i + 1);
-    }
-    parts.assign(shape.parts.begin(), shape.parts.end());
-    const bool hasParts = kind == ShapeKind::Line || kind == ShapeKind::Polygon;
-    if (hasParts && parts.empty()) parts = {0};
-    const ObjectHandle object(
-        shape.points.empty()
-            ? SHPCreateObject(SHPT_NULL, -1, 0, nullptr, nullptr, 0, nullptr, nullptr, nullptr, nullptr)
-            : SHPCreateObject(type, -1, hasParts ? static_cast<int>(parts.size()) : 0, parts.data(), nullptr,
-                              static_cast<int>(x.size()), x.data(), y.data(),
-                              shape.z.empty() ? nullptr : shape.z.data(), shape.m.empty() ? nullptr : shape.m.data()));
-    if (!object || SHPWriteObject(file.get(), -1, object.get()) < 0)
-      return fmt::format("shape {} cannot be stored", i + 1);
-  }
-  return {};
-}
-
-struct NamedBytes {
-  std::string path;
-  std::string_view bytes;
-};
-
-/// Writes all files beside their targets before the first takes its place, so that a full disk leaves all as they were.
-FileResult WriteSet(const std::vector<NamedBytes>& set) {
-  std::vector<FileReplacement> replacements(set.size());
-  for (std::size_t i = 0; i < set.size(); ++i) {
-    if (FileResult begun = replacements[i].Begin(set[i].path); !begun.Ok()) return begun;
-    std::ofstream stream(NativePath(replacements[i].TemporaryPath()), std::ios::binary);
-    stream.write(set[i].bytes.data(), static_cast<std::streamsize>(set[i].bytes.size()));
-    stream.close();
-    if (!stream) return {fmt::format("cannot write {}: the disk may be full; nothing was written", set[i].path), {}};
-  }
-  FileResult result;
-  for (FileReplacement& replacement : replacements) {
-    const FileResult written = replacement.Commit();
-    if (!written.Ok()) return written;
-    if (!written.note.empty()) AddNote(result.note, written.note);
-  }
-  return result;
-}
-
-}  // namespace
-
-bool CTvnShapeData::GetTranscribingRect(Envelope& rectangle) const {
-  bool isAny = false;
-  for (const Shape& shape : shapes_) {
-    for (const MapPoint point : shape.points) {
-      if (!isAny) rectangle = {point.x, point.y, point.x, point.y};
-      isAny = true;
-      rectangle.xMin = std::min(rectangle.xMin, point.x);
-      rectangle.yMin = std::min(rectangle.yMin, point.y);
-      rectangle.xMax = std::max(rectangle.xMax, point.x);
-      rectangle.yMax = std::max(rectangle.yMax, point.y);
-    }
-  }
-  return isAny;
-}
-
-void CTvnShapeData::Create(ShapeKind kind, std::vector<ShapeField> columns, std::string projection) {
-  kind_ = kind;
-  fields_ = columns;
-  columns_ = std::move(columns);
-  projection_ = std::move(projection);
-  shapes_.clear();
-}
-
-FileResult CTvnShapeData::SaveShapeFile(const std::string& path) const {
-  const Unit* const unit = FindLengthUnit(axisUnit_);
-  const auto refused = [&path](std::string_view reason) {
-    return FileResult{fmt::format("cannot write {}: {}", path, reason), {}};
-  };
-  if (!unit) return refused(fmt::format("the unit {} of its coordinates is no length", axisUnit_));
-  if (!EqualIgnoringCase(ExtensionOf(path), ".shp")) return refused("its name does not end in .shp");
-  MemoryFiles files;
-  Reason reason;
-  try {
-    const MemoryFilesScope scope(files);
-    reason = MakeShapes(kind_, shapes_, *ConversionBetween(UnitScale{Dimension::Length}, unit->scale));
-    if (reason.empty() && columns_.empty()) {
-      std::vector<Shape> numbered(shapes_.size());
-      for (std::size_t i = 0; i < numbered.size(); ++i) numbered[i].values = {static_cast<std::int64_t>(i + 1)};
-      reason = MakeTable({{"ID", AttributeKind::Whole}}, numbered);
-    } else if (reason.empty()) {
-      reason = MakeTable(columns_, shapes_);
-    }
-  } catch (const std::bad_alloc&) {
-    reason = "there is no memory for its bytes";
-  }
-  if (reason.empty()) reason = files.firstMessage;
-  if (!reason.empty()) return refused(reason);
-
-  const std::string base = path.substr(0, path.size() - 4);
-  std::vector<NamedBytes> set = {{base + ".dbf", files.dbf.written}, {base + ".cpg", files.cpg.written}};
-  if (!projection_.empty()) set.push_back({base + ".prj", projection_});
-  set.push_back({base + ".shx", files.shx.written});
-  set.push_back({path, files.shp.written});
-  FileResult result = WriteSet(set);
-  if (result.Ok() && projection_.empty() && FileExists(base + ".prj")) {
-    AddNote(result.note, fmt::format("{}.prj was there and still tells the projection", base));
-  }
-  return result;
 }
 
 }  // namespace tervane

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/grid_polygons.h"
 
+#include <algorithm>
 #include <cmath>
 #include <random>
 #include <string>
@@ -91,6 +92,20 @@ TEST(Polygons, ThatShareEdgesLeaveNoGapAndDoNotOverlap) {
   }
   EXPECT_EQ(Picture(sum, geometry, 0),
             "........\n........\n111111..\n111111..\n111111..\n111111..\n111111..\n111111..\n");
+}
+
+TEST(Polygons, MayCrossMoreRowsThanAreHeldAtOnce) {
+  const GridGeometry geometry{3, 20000, 1, 0, 0, 0, ""};
+  for (const int turns : {275, 276}) {
+    // Once round is inside, twice round is outside again.
+    Shape shape = Rectangle(1, 0, 2, 20000);
+    const std::vector<MapPoint> ring = shape.points;
+    for (int k = 1; k < turns; ++k) shape.points.insert(shape.points.end(), ring.begin(), ring.end());
+    std::vector<float> values(geometry.CellCount());
+    PutPolygons({shape}, {1}, geometry, -1, values);
+    EXPECT_EQ(std::count(values.begin(), values.end(), 1.0f), turns % 2 * 20000);
+    EXPECT_EQ(values[3 * 19999 + 1], static_cast<float>(turns % 2));
+  }
 }
 
 TEST(Polygons, GiveADomainWithItsOuterBoundary) {
