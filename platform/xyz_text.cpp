@@ -1,0 +1,85 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "platform/xyz_text.h"
+
+#include <new>
+
+#include <fmt/format.h>
+
+#include "platform/text.h"
+#include "platform/text_fields.h"
+
+namespace tervane {
+namespace {
+
+bool IsComment(std::string_view trimmed) {
+  return trimmed.empty() || trimmed.front() == '#' || trimmed.front() == '!' || trimmed.front() == '%';
+}
+
+/// Reads x, y and z; gives why that fails.
+std::string ReadPoint(std::string_view line, FieldRules rules, ScatteredPoint& point) {
+  static constexpr const char* kNames[] = {"x", "y", "z"};
+  double* const targets[] = {&point.x, &point.y, &point.z};
+  for (std::size_t i = 0; i < 3; ++i) {
+    const std::string_view field = NextField(line, rules);
+    if (field.empty())
+      return fmt::format("{} is missing: a point needs x, y and z, and there are {} numbers", kNames[i], i);
+    if (!ReadNumber(field, rules, *targets[i]))
+      return fmt::format("{} is \"{}\", which is no number", kNames[i], Shown(field));
+  }
+  return {};
+}
+
+/// True when the line begins with a number, so that it is meant to be a point.
+bool BeginsWithNumber(std::string_view line, FieldRules rules) {
+  double number = 0;
+  return ReadNumber(NextField(line, rules), rules, number);
+}
+
+FileResult ParseLines(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points) {
+  if (const std::string reason = WhyNoText(text); !reason.empty()) {
+    return {fmt::format("cannot read {}: {}", path, reason), {}};
+  }
+  LineReader lines(text);
+  FieldRules rules;
+  std::string_view line;
+  while (lines.Next(line)) {
+    if (IsComment(Trimmed(line))) continue;
+    if (points.empty()) {
+      rules.isCommaDecimal = line.find(';') != std::string_view::npos;
+      if (!BeginsWithNumber(line, rules)) continue;
+      // The length of the first point tells about how many there are, so that the list seldom grows.
+      points.reserve(text.size() / (line.size() + 1) + 1);
+    }
+    ScatteredPoint point;
+    if (const std::string reason = ReadPoint(line, rules, point); !reason.empty()) {
+      return {fmt::format("{}, line {}: {}", path, lines.Number(), reason), {}};
+    }
+    points.push_back(point);
+  }
+  if (points.empty()) return {fmt::format("{} holds no points: no line begins with a number", path), {}};
+  return {};
+}
+
+}  // namespace
+
+FileResult ParseXyz(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points) {
+  points.clear();
+  FileResult result;
+  try {
+    result = ParseLines(text, path, points);
+  } catch (const std::bad_alloc&) {
+    result.error = fmt::format("cannot read {}: there is no memory for its points", path);
+  }
+  if (!result.Ok()) points.clear();
+  return result;
+}
+
+FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& points) {
+  points.clear();
+  FileContent content;
+  if (FileResult result = ReadWholeFile(path, content); !result.Ok()) return result;
+  return ParseXyz(content.Text(), path, points);
+}
+
+}  // namespace tervane
