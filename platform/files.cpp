@@ -196,11 +196,10 @@ void AddNote(std::string& note, std::string_view text) {
   note += text;
 }
 
-/// Makes the content a file at `target` in one step, with the attributes of `model` where that is open.
-Reason Publish(const fs::path& target, std::string_view content, os::File model, Rename rename, std::string& note) {
+/// Makes a file beside `target`, with the attributes of `model` where that is open.
+Reason CreateBeside(const fs::path& target, const os::File& model, TemporaryFile& temporary, std::string& note) {
   RemoveStaleTemporaries(target);
   std::error_code error;
-  TemporaryFile temporary;
   // A private file must not be readable by others for a moment.
   temporary.Create(target, model.IsOpen() ? os::File::Access::OwnerOnly : os::File::Access::AsMaskAllows, error);
   const std::string folder = TextOfPath(HostFolderOf(target));
@@ -213,17 +212,29 @@ Reason Publish(const fs::path& target, std::string_view content, os::File model,
   std::string notKept;
   if (model.IsOpen()) temporary.file.TakeAttributesOf(model, notKept, error);
   if (error) return InWords(error);
-  model = os::File();  // an open file cannot be replaced everywhere
-  if (Reason reason = WriteAndClose(temporary.file, content); !reason.empty()) return reason;
+  if (!notKept.empty()) AddNote(note, "not kept of the old file: " + notKept);
+  return {};
+}
+
+/// Puts the closed temporary file in the target's place.
+Reason PutInPlace(TemporaryFile& temporary, const fs::path& target, Rename rename, std::string& note) {
+  std::error_code error;
   rename(temporary.Path(), TextOfPath(target), error);
   if (error) return InWords(error);
   temporary.WasRenamed();
-
-  if (!notKept.empty()) AddNote(note, "not kept of the old file: " + notKept);
-  os::FlushFolder(folder, error);
+  os::FlushFolder(TextOfPath(HostFolderOf(target)), error);
   // Too late for an error: the new file stands.
   if (error) AddNote(note, "the file is written, but its folder could not be flushed: " + InWords(error));
   return {};
+}
+
+/// Makes the content a file at `target` in one step, with the attributes of `model` where that is open.
+Reason Publish(const fs::path& target, std::string_view content, os::File model, Rename rename, std::string& note) {
+  TemporaryFile temporary;
+  if (Reason reason = CreateBeside(target, model, temporary, note); !reason.empty()) return reason;
+  model = os::File();  // an open file cannot be replaced everywhere
+  if (Reason reason = WriteAndClose(temporary.file, content); !reason.empty()) return reason;
+  return PutInPlace(temporary, target, rename, note);
 }
 
 /// Opens an existing file to be read whole, or to be replaced.
@@ -315,24 +326,91 @@ FileResult ReadWholeFile(const std::string& path, FileContent& content) {
   return result;
 }
 
-FileResult WriteFileAtomically(const std::string& path, std::string_view content) {
-  FileResult result;
-  fs::path target = NativePath(path);
+namespace {
+
+/// The file that a write is to replace, found and allowed, or why it may not be.
+struct WriteTarget {
+  fs::path path;
   os::File old;
   os::File::Status status;
-  Reason reason = WhyNoPath(path);
-  if (reason.empty()) {
-    if (const std::error_code error = FollowLinks(target)) reason = InWords(error);
+  Reason reason;
+
+  explicit WriteTarget(const std::string& name) : path(NativePath(name)), reason(WhyNoPath(name)) {
+    if (reason.empty()) {
+      if (const std::error_code error = FollowLinks(path)) reason = InWords(error);
+    }
+    if (reason.empty()) reason = OpenOldFile(path, old, status);
   }
-  if (reason.empty()) reason = OpenOldFile(target, old, status);
-  if (reason.empty()) reason = Publish(target, content, std::move(old), os::RenameOver, result.note);
+};
+
+FileResult OutcomeOfWrite(const std::string& path, const Reason& reason, const os::File::Status& old,
+                          std::string note) {
+  FileResult result;
   if (!reason.empty()) {
     result.error = fmt::format("cannot write {}: {}; {}", path, reason,
-                               status.isRegular ? "the file is unchanged" : "nothing was written");
-  } else if (status.links > 1) {
-    AddNote(result.note, "hard link: the other names of the file keep the old content");
+                               old.isRegular ? "the file is unchanged" : "nothing was written");
+    return result;
   }
+  result.note = std::move(note);
+  if (old.links > 1) AddNote(result.note, "hard link: the other names of the file keep the old content");
   return result;
+}
+
+}  // namespace
+
+FileResult WriteFileAtomically(const std::string& path, std::string_view content) {
+  WriteTarget target(path);
+  std::string note;
+  if (target.reason.empty()) {
+    target.reason = Publish(target.path, content, std::move(target.old), os::RenameOver, note);
+  }
+  return OutcomeOfWrite(path, target.reason, target.status, note);
+}
+
+struct FileReplacement::State {
+  std::string name;
+  fs::path target;
+  os::File::Status old;
+  TemporaryFile temporary;
+  std::string note;
+};
+
+FileReplacement::FileReplacement() = default;
+FileReplacement::FileReplacement(FileReplacement&& other) noexcept = default;
+FileReplacement& FileReplacement::operator=(FileReplacement&& other) noexcept = default;
+FileReplacement::~FileReplacement() = default;
+
+FileResult FileReplacement::Begin(const std::string& path) {
+  WriteTarget target(path);
+  auto state = std::make_unique<State>();
+  state->name = path;
+  state->target = target.path;
+  state->old = target.status;
+  if (target.reason.empty()) {
+    target.reason = CreateBeside(target.path, target.old, state->temporary, state->note);
+  }
+  if (target.reason.empty()) state_ = std::move(state);
+  return OutcomeOfWrite(path, target.reason, target.status, {});
+}
+
+const std::string& FileReplacement::TemporaryPath() const { return state_->temporary.Path(); }
+
+FileResult FileReplacement::Commit() {
+  const std::unique_ptr<State> state = std::move(state_);
+  std::error_code error;
+  state->temporary.file.Flush(error);
+  if (!error) state->temporary.file.Close(error);
+  const Reason reason =
+      error ? InWords(error) : PutInPlace(state->temporary, state->target, os::RenameOver, state->note);
+  return OutcomeOfWrite(state->name, reason, state->old, state->note);
+}
+
+std::string WhyNotReadable(const std::string& path) {
+  os::File file;
+  os::File::Status status;
+  Reason reason = WhyNoPath(path);
+  if (reason.empty()) reason = OpenRegular(path, file, status);
+  return reason.empty() ? reason : fmt::format("cannot read {}: {}", path, reason);
 }
 
 FileResult CopyToNewFile(const std::string& from, const std::string& to) {

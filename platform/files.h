@@ -41,6 +41,31 @@ FileResult ReadWholeFile(const std::string& path, FileContent& content);
 /// stands byte for byte and nothing is left beside it.
 FileResult WriteFileAtomically(const std::string& path, std::string_view content);
 
+/// A file that a library writes under a temporary name, put in place in one step like an atomic write. What was not
+/// committed is removed.
+class FileReplacement {
+ public:
+  FileReplacement();
+  FileReplacement(FileReplacement&& other) noexcept;
+  FileReplacement& operator=(FileReplacement&& other) noexcept;
+  ~FileReplacement();
+
+  /// Makes an empty file beside the target, with the attributes of an old file there; refuses what an atomic write
+  /// refuses.
+  FileResult Begin(const std::string& path);
+  /// What the library may open and fill, not remove or replace; valid from `Begin` to `Commit`.
+  const std::string& TemporaryPath() const;
+  /// Flushes and renames. The library must have closed the file.
+  FileResult Commit();
+
+ private:
+  struct State;
+  std::unique_ptr<State> state_;
+};
+
+/// "" for a regular file that can be opened for reading, else "cannot read PATH: REASON".
+std::string WhyNotReadable(const std::string& path);
+
 /// Copies a file to a name that does not exist yet (an existing file is an error), flushed like an atomic write.
 FileResult CopyToNewFile(const std::string& from, const std::string& to);
 
