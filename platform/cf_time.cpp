@@ -23,7 +23,7 @@ struct TimeUnit {
 };
 // Months and years have no fixed length: they are not among these.
 constexpr TimeUnit kTimeUnits[] = {
-    {" milliseconds millisecond millisec millisecs msec ms ", 0.001},
+    {" milliseconds millisecond millisec millisecs msecs msec ms ", 0.001},
     {" seconds second sec secs s ", 1},
     {" minutes minute min mins ", 60},
     {" hours hour hr hrs h ", 3600},

@@ -123,7 +123,7 @@ struct DataFile::State {
   DataFileHeader header;
 
   ~State() {
-    const std::lock_guard lock(netcdf::Mutex());
+    const netcdf::Lock lock;
     file = netcdf::Handle();
   }
 
@@ -185,7 +185,7 @@ std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector
                                          std::vector<std::size_t> count, std::size_t nx, std::span<float> values,
                                          const UnitConversion* conversion) const {
   {
-    const std::lock_guard lock(netcdf::Mutex());
+    const netcdf::Lock lock;
     if (const int status = nc_get_vara_float(file.Id(), storage.variable, start.data(), count.data(), values.data())) {
       return netcdf::InWords(status);
     }
@@ -258,7 +258,7 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
       target += stride[outermost] * static_cast<std::ptrdiff_t>(slice);
     }
     {
-      const std::lock_guard lock(netcdf::Mutex());
+      const netcdf::Lock lock;
       if (const int status = nc_get_vara_double(file.Id(), storage.variable, start.data(), count.data(), box.data()))
         return netcdf::InWords(status);
     }
@@ -287,7 +287,7 @@ std::string DataFile::Open(const std::string& path) {
   try {
     reason = WhyNoNetcdf(path);
     if (reason.empty()) {
-      const std::lock_guard lock(netcdf::Mutex());
+      const netcdf::Lock lock;
       int id = -1;
       // An absolute path, because the library takes others for addresses of the network.
       const int status = nc_open(AbsoluteFromHere(path).c_str(), NC_NOWRITE, &id);

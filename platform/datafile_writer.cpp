@@ -150,7 +150,7 @@ struct DataFileWriter::State {
   std::string failure;  ///< The first one; nothing is written behind it.
 
   ~State() {
-    const std::lock_guard lock(netcdf::Mutex());
+    const netcdf::Lock lock;
     file = netcdf::Handle();
   }
 
@@ -334,7 +334,7 @@ std::string DataFileWriter::State::PutPart(int item, std::optional<int> layer, s
     count.push_back(static_cast<std::size_t>(geometry.nx));
   }
   {
-    const std::lock_guard lock(netcdf::Mutex());
+    const netcdf::Lock lock;
     const int status = nc_put_vara_float(file.Id(), variables[index], start.data(), count.data(), values.data());
     if (status != NC_NOERR) return refused(netcdf::InWords(status));
   }
@@ -365,7 +365,7 @@ std::string DataFileWriter::Create(const std::string& path, const NewDataFile& c
   state->isPut.assign(content.items.size(), std::vector<bool>(static_cast<std::size_t>(geometry.nz)));
   if (FileResult begun = state->replacement.Begin(path); !begun.Ok()) return begun.error;
   {
-    const std::lock_guard lock(netcdf::Mutex());
+    const netcdf::Lock lock;
     int id = -1;
     int status = nc_create(AbsoluteFromHere(state->replacement.TemporaryPath()).c_str(),
                            NC_CLOBBER | (content.isCompressed ? NC_NETCDF4 : NC_64BIT_OFFSET), &id);
@@ -395,7 +395,7 @@ std::string DataFileWriter::AddStep(const CYbDateTime& stamp) {
   const std::size_t step = state.step ? *state.step + 1 : 0;
   const auto seconds = static_cast<double>(stamp.SecondsSinceEpoch());
   Calls call;
-  const std::lock_guard lock(netcdf::Mutex());
+  const netcdf::Lock lock;
   const int file = state.file.Id();
   call([&] { return nc_put_var1_double(file, state.time, &step, &seconds); });
   if (state.bounds >= 0) {
@@ -442,7 +442,7 @@ FileResult DataFileWriter::Finish() {
     if (const std::string reason = state->WhyStepIsIncomplete(); !reason.empty()) return {state->Fail(reason), {}};
   }
   {
-    const std::lock_guard lock(netcdf::Mutex());
+    const netcdf::Lock lock;
     Calls call;
     const int file = state->file.Id();
     for (std::size_t i = 0; i < state->variables.size(); ++i) {

@@ -53,7 +53,7 @@ EvenAxis FindSpacing(std::span<const double> values, bool areSinglePrecision) {
   axis.first = values.front();
   axis.last = values.back();
   double largest = 0;
-  for (const double value : values) {
+  for (const double& value : values) {
     if (!std::isfinite(value)) {
       axis.error = fmt::format("number {} of its values is missing", &value - values.data() + 1);
       return axis;

@@ -10,14 +10,25 @@
 #include <system_error>
 
 #include <fmt/format.h>
+#include <hdf5.h>
 
 #include "platform/os.h"
 
 namespace tervane::netcdf {
 
+namespace {
+
 std::mutex& Mutex() {
   static std::mutex mutex;
   return mutex;
+}
+
+}  // namespace
+
+Lock::Lock() : guard_(Mutex()) {
+  // The setting is one of each thread.
+  thread_local const herr_t silenced = H5Eset_auto2(H5E_DEFAULT, nullptr, nullptr);
+  static_cast<void>(silenced);
 }
 
 std::string InWords(int status) {

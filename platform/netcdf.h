@@ -17,8 +17,15 @@
 
 namespace tervane::netcdf {
 
-/// To be held around every call of netCDF, HDF5 and GDAL's drivers for them, none of which is made for threads.
-std::mutex& Mutex();
+/// To be held around every call of netCDF, HDF5 and GDAL's drivers for them, none of which is made for threads. It also
+/// keeps HDF5 from printing its errors: they come back as statuses.
+class Lock {
+ public:
+  Lock();
+
+ private:
+  std::lock_guard<std::mutex> guard_;
+};
 
 /// Why a call failed, for the person who must act.
 std::string InWords(int status);
