@@ -1,0 +1,417 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "platform/datafile.h"
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <new>
+#include <utility>
+
+#include <fmt/format.h>
+
+#include "platform/datafile_header.h"
+#include "platform/files.h"
+#include "platform/netcdf.h"
+#include "platform/os.h"
+#include "platform/paths.h"
+
+namespace tervane {
+
+namespace {
+
+/// Values that are converted at one time, small enough for the processor's cache.
+constexpr std::size_t kPiece = std::size_t{1} << 16;
+
+/// "" when the file begins as a netCDF file does and is whole as far as that shows.
+std::string WhyNoNetcdf(const std::string& path) {
+  bool isClassic = false;
+  if (std::string reason = netcdf::WhyClassicFileIsBad(path, isClassic); !reason.empty() || isClassic) return reason;
+  std::error_code error;
+  os::File file = os::File::OpenForReading(path, error);
+  std::array<char, 8> begin{};
+  constexpr std::string_view kHdf5 = "\x89HDF\r\n\x1a\n";
+  if (!error && file.Read(begin.data(), begin.size(), error) == begin.size() &&
+      std::string_view(begin.data(), begin.size()) == kHdf5) {
+    return {};
+  }
+  return "it is no netCDF file";
+}
+
+/// Puts kDeleteValue for what is missing in values that are stored as they are.
+void MarkMissing(const ItemStorage& storage, std::span<float> values) {
+  // One plain loop for each condition is faster than one loop with all of them.
+  for (float& value : values) value = std::abs(value) <= std::numeric_limits<float>::max() ? value : kDeleteValue;
+  for (const double missing : storage.missing) {
+    const auto mark = static_cast<float>(missing);
+    if (mark == kDeleteValue) continue;
+    for (float& value : values) value = value == mark ? kDeleteValue : value;
+  }
+  if (!storage.HasValidRange()) return;
+  const auto from =
+      static_cast<float>(std::max(storage.validFrom, -static_cast<double>(std::numeric_limits<float>::max())));
+  const auto to = static_cast<float>(std::min(storage.validTo, static_cast<double>(std::numeric_limits<float>::max())));
+  for (float& value : values) value = value >= from && value <= to ? value : kDeleteValue;
+}
+
+/// The number that a stored one means; a NaN when it is missing.
+double Unpacked(const ItemStorage& storage, double stored) {
+  if (storage.isUnsigned && stored < 0) {
+    stored += storage.type == NC_BYTE ? 0x1p8 : storage.type == NC_SHORT ? 0x1p16 : 0x1p32;
+  }
+  constexpr double kNone = std::numeric_limits<double>::quiet_NaN();
+  if (!std::isfinite(stored) || !(stored >= storage.validFrom && stored <= storage.validTo)) return kNone;
+  for (double missing : storage.missing) {
+    if (storage.isUnsigned && missing < 0) {
+      missing += storage.type == NC_BYTE ? 0x1p8 : storage.type == NC_SHORT ? 0x1p16 : 0x1p32;
+    }
+    if (stored == missing) return kNone;
+  }
+  return stored * storage.scale + storage.offset;
+}
+
+}  // namespace
+
+std::string_view ValueTypeText(ValueType type) {
+  constexpr std::string_view kTexts[] = {"instantaneous", "accumulated", "accumulated over the step",
+                                         "mean over the step"};
+  return kTexts[static_cast<std::size_t>(type)];
+}
+
+void ValueSummary::Add(std::span<const float> values) {
+  // Sixteen of each, so that the processor works on them side by side; the sum over a piece is exact enough in floats'
+  // doubles.
+  constexpr std::size_t kLanes = 16;
+  std::array<float, kLanes> least, most;
+  std::array<double, kLanes> sums{};
+  std::array<std::uint32_t, kLanes> counts{};
+  least.fill(smallest);
+  most.fill(largest);
+  const auto add = [&](std::size_t lane, float value) {
+    const bool isValue = value != kDeleteValue;
+    least[lane] = isValue && value < least[lane] ? value : least[lane];
+    most[lane] = isValue && value > most[lane] ? value : most[lane];
+    sums[lane] += isValue ? static_cast<double>(value) : 0.0;
+    counts[lane] += isValue ? 1u : 0u;
+  };
+  std::size_t i = 0;
+  for (; i + kLanes <= values.size(); i += kLanes)
+    for (std::size_t lane = 0; lane < kLanes; ++lane) add(lane, values[i + lane]);
+  for (; i < values.size(); ++i) add(0, values[i]);
+  std::uint64_t added = 0;
+  for (std::size_t lane = 0; lane < kLanes; ++lane) {
+    smallest = std::min(smallest, least[lane]);
+    largest = std::max(largest, most[lane]);
+    sum += sums[lane];
+    added += counts[lane];
+  }
+  count += added;
+  missing += values.size() - added;
+}
+
+void ValueSummary::Add(const ValueSummary& other) {
+  smallest = std::min(smallest, other.smallest);
+  largest = std::max(largest, other.largest);
+  sum += other.sum;
+  count += other.count;
+  missing += other.missing;
+}
+
+struct DataFile::State {
+  std::string path;
+  netcdf::Handle file;
+  DataFileHeader header;
+
+  ~State() {
+    const netcdf::Lock lock;
+    file = netcdf::Handle();
+  }
+
+  /// Reads one step (and layer) that stands in the order of the buffer.
+  std::string ReadInOrder(const ItemStorage& storage, std::vector<std::size_t> start, std::vector<std::size_t> count,
+                          std::size_t nx, std::span<float> values, const UnitConversion* conversion) const;
+  std::string ReadByBoxes(const ItemStorage& storage, const DataItem& item, std::size_t step, std::optional<int> layer,
+                          std::span<float> values, const UnitConversion* conversion) const;
+};
+
+namespace {
+
+/// Converts values that are not missing. A result that no float holds is an error.
+bool Convert(const UnitConversion& conversion, std::span<float> values) {
+  bool fits = true;
+  for (float& value : values) {
+    if (value == kDeleteValue) continue;
+    const double converted = conversion(static_cast<double>(value));
+    fits = fits && std::abs(converted) <= static_cast<double>(std::numeric_limits<float>::max());
+    value = static_cast<float>(converted);
+  }
+  return fits;
+}
+
+/// Where the values of a box, which come in the file's order, the last dimension the fastest, go in a buffer.
+class BoxWalk {
+ public:
+  BoxWalk(const std::vector<std::size_t>& count, const std::vector<std::ptrdiff_t>& stride, std::ptrdiff_t first)
+      : target_(first) {
+    for (std::size_t i = count.size(); i > 0; --i)
+      if (count[i - 1] > 1) dimensions_.push_back({count[i - 1], 0, stride[i - 1]});
+  }
+
+  std::size_t Next() {
+    const auto place = static_cast<std::size_t>(target_);
+    for (Along& along : dimensions_) {
+      target_ += along.stride;
+      if (++along.index < along.count) break;
+      target_ -= along.stride * static_cast<std::ptrdiff_t>(along.count);
+      along.index = 0;
+    }
+    return place;
+  }
+
+ private:
+  struct Along {
+    std::size_t count, index;
+    std::ptrdiff_t stride;
+  };
+  std::vector<Along> dimensions_;  ///< The fastest first.
+  std::ptrdiff_t target_;
+};
+
+constexpr const char* kTooLarge = "a value is too large for single precision in this unit";
+
+}  // namespace
+
+std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector<std::size_t> start,
+                                         std::vector<std::size_t> count, std::size_t nx, std::span<float> values,
+                                         const UnitConversion* conversion) const {
+  {
+    const netcdf::Lock lock;
+    if (const int status = nc_get_vara_float(file.Id(), storage.variable, start.data(), count.data(), values.data())) {
+      return netcdf::InWords(status);
+    }
+  }
+  bool fits = true;
+  for (std::size_t begin = 0; begin < values.size(); begin += kPiece) {
+    const std::span<float> piece = values.subspan(begin, std::min(kPiece, values.size() - begin));
+    MarkMissing(storage, piece);
+    if (conversion != nullptr) fits = Convert(*conversion, piece) && fits;
+  }
+  if (storage.isYTurned) {
+    const std::size_t layerSize = nx * storage.lengths[static_cast<std::size_t>(storage.y)];
+    for (std::size_t layer = 0; layer < values.size(); layer += layerSize) {
+      for (std::size_t low = layer, high = layer + layerSize - nx; low < high; low += nx, high -= nx)
+        std::swap_ranges(values.begin() + static_cast<std::ptrdiff_t>(low),
+                         values.begin() + static_cast<std::ptrdiff_t>(low + nx),
+                         values.begin() + static_cast<std::ptrdiff_t>(high));
+    }
+  }
+  return fits ? std::string() : kTooLarge;
+}
+
+std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataItem& item, std::size_t step,
+                                         std::optional<int> layer, std::span<float> values,
+                                         const UnitConversion* conversion) const {
+  const std::size_t rank = storage.lengths.size();
+  std::vector<std::size_t> start(rank, 0), count(rank, 1);
+  // How far apart neighbours along each dimension of the file stand in the buffer, and where the file's first goes.
+  std::vector<std::ptrdiff_t> stride(rank, 0);
+  std::ptrdiff_t origin = 0;
+  std::size_t outermost = rank;
+  const auto nx = static_cast<std::ptrdiff_t>(item.geometry.nx);
+  const auto ny = static_cast<std::ptrdiff_t>(item.geometry.ny);
+  const auto place = [&](int dimension, std::ptrdiff_t distance, bool isTurned) {
+    if (dimension < 0) return;
+    const auto d = static_cast<std::size_t>(dimension);
+    count[d] = storage.lengths[d];
+    stride[d] = isTurned ? -distance : distance;
+    if (isTurned) origin += distance * static_cast<std::ptrdiff_t>(storage.lengths[d] - 1);
+    outermost = std::min(outermost, d);
+  };
+  place(storage.x, 1, storage.isXTurned);
+  place(storage.y, nx, storage.isYTurned);
+  if (storage.z >= 0 && layer) {
+    const auto z = static_cast<std::size_t>(storage.z);
+    start[z] = storage.isZTurned ? storage.lengths[z] - 1 - static_cast<std::size_t>(*layer)
+                                 : static_cast<std::size_t>(*layer);
+  } else {
+    place(storage.z, nx * ny, storage.isZTurned);
+  }
+  if (storage.time >= 0) {
+    const auto time = static_cast<std::size_t>(storage.time);
+    start[time] = step;
+    // A series: its steps are what stands side by side.
+    if (item.dimensions == 0) {
+      count[time] = values.size();
+      stride[time] = 1;
+    }
+  }
+
+  // One slice of the outermost dimension at a time keeps the buffer of doubles small.
+  const bool isSliced = outermost < rank && values.size() > kPiece;
+  const std::size_t slices = isSliced ? std::exchange(count[outermost], 1) : 1;
+  std::vector<double> box(values.size() / slices);
+  bool fits = true;
+  for (std::size_t slice = 0; slice < slices; ++slice) {
+    std::ptrdiff_t target = origin;
+    if (isSliced) {
+      start[outermost] = slice;
+      target += stride[outermost] * static_cast<std::ptrdiff_t>(slice);
+    }
+    {
+      const netcdf::Lock lock;
+      if (const int status = nc_get_vara_double(file.Id(), storage.variable, start.data(), count.data(), box.data()))
+        return netcdf::InWords(status);
+    }
+    BoxWalk walk(count, stride, target);
+    for (const double stored : box) {
+      double value = Unpacked(storage, stored);
+      if (conversion != nullptr) value = (*conversion)(value);
+      const bool isFloat = std::abs(value) <= static_cast<double>(std::numeric_limits<float>::max());
+      fits = fits && (isFloat || std::isnan(value));
+      values[walk.Next()] = isFloat ? static_cast<float>(value) : kDeleteValue;
+    }
+  }
+  return fits ? std::string() : kTooLarge;
+}
+
+DataFile::DataFile() : state_(std::make_unique<State>()) {}
+DataFile::DataFile(DataFile&& other) noexcept = default;
+DataFile& DataFile::operator=(DataFile&& other) noexcept = default;
+DataFile::~DataFile() = default;
+
+std::string DataFile::Open(const std::string& path) {
+  auto state = std::make_unique<State>();
+  state->path = path;
+  std::string reason = WhyNotReadable(path);
+  if (!reason.empty()) return reason;
+  try {
+    reason = WhyNoNetcdf(path);
+    if (reason.empty()) {
+      const netcdf::Lock lock;
+      int id = -1;
+      // An absolute path, because the library takes others for addresses of the network.
+      const int status = nc_open(AbsoluteFromHere(path).c_str(), NC_NOWRITE, &id);
+      if (status == NC_NOERR) {
+        state->file = netcdf::Handle(id);
+        reason = ReadHeader(id, state->header);
+      } else {
+        reason = netcdf::InWords(status);
+      }
+    }
+  } catch (const std::bad_alloc&) {
+    reason = "it needs more than the free memory";
+  }
+  if (!reason.empty()) return fmt::format("cannot read {}: {}", path, reason);
+  state_ = std::move(state);
+  return {};
+}
+
+const std::string& DataFile::Path() const { return state_->path; }
+const std::vector<DataItem>& DataFile::Items() const { return state_->header.items; }
+const TimeAxis& DataFile::Time() const { return state_->header.time; }
+const std::vector<std::string>& DataFile::Notes() const { return state_->header.notes; }
+
+std::size_t DataFile::SizeOf(const ValueSelection& selection) const {
+  if (selection.item < 1 || static_cast<std::size_t>(selection.item) > Items().size()) return 0;
+  const DataItem& item = Items()[static_cast<std::size_t>(selection.item - 1)];
+  return selection.steps * (selection.layer ? item.CellsOfLayer() : item.Cells());
+}
+
+std::string DataFile::Read(const ValueSelection& selection, std::span<float> values,
+                           std::optional<int> inBaseUnitOf) const {
+  const auto refused = [&](const std::string& reason) { return fmt::format("cannot read {}: {}", Path(), reason); };
+  if (selection.item < 1 || static_cast<std::size_t>(selection.item) > Items().size()) {
+    return refused(fmt::format("there is no item {}: the file has {}", selection.item, Items().size()));
+  }
+  const DataItem& item = Items()[static_cast<std::size_t>(selection.item - 1)];
+  const ItemStorage& storage = state_->header.storages[static_cast<std::size_t>(selection.item - 1)];
+  const std::size_t steps = item.hasTime ? state_->header.time.steps : 1;
+  if (selection.step >= steps || selection.steps > steps - selection.step) {
+    return refused(
+        fmt::format("there is no step {}: the item {} has {}", selection.step + selection.steps, item.name, steps));
+  }
+  if (selection.layer && (*selection.layer < 0 || *selection.layer >= item.geometry.nz)) {
+    return refused(
+        fmt::format("there is no layer {}: the item {} has {}", *selection.layer + 1, item.name, item.geometry.nz));
+  }
+  if (values.size() != SizeOf(selection)) {
+    return refused(fmt::format("{} values were asked for, {} are there", values.size(), SizeOf(selection)));
+  }
+  std::optional<UnitConversion> conversion;
+  if (inBaseUnitOf && *inBaseUnitOf != kUndefinedItemType) {
+    const ItemType* wanted = FindItemType(*inBaseUnitOf);
+    if (wanted == nullptr) return refused(fmt::format("there is no item type {}", *inBaseUnitOf));
+    const Unit& base = BaseUnit(*wanted);
+    if (item.scale) conversion = ConversionBetween(*item.scale, base.scale);
+    if (!conversion) {
+      return refused(fmt::format("the item {} is in \"{}\", which does not convert to {}, the unit of {}", item.name,
+                                 item.unitText, base.text, wanted->name));
+    }
+    // The same unit: its values stay as they are to the last bit.
+    if ((*conversion)(1.0) == 1.0 && (*conversion)(0.0) == 0.0) conversion.reset();
+  }
+
+  const UnitConversion* converter = conversion ? &*conversion : nullptr;
+  const bool isInOrder = storage.type == NC_FLOAT && !storage.IsPacked() && storage.IsInOrder();
+  // A series is read in one call, grids step by step.
+  const bool isSeries = item.dimensions == 0;
+  const std::size_t calls = isSeries ? 1 : selection.steps;
+  const std::size_t size = calls == 0 ? 0 : values.size() / calls;
+  try {
+    for (std::size_t i = 0; i < calls; ++i) {
+      const std::span<float> part = values.subspan(i * size, size);
+      std::string reason;
+      if (isInOrder) {
+        std::vector<std::size_t> start(storage.lengths.size(), 0), count = storage.lengths;
+        if (storage.time >= 0) {
+          start[static_cast<std::size_t>(storage.time)] = selection.step + i;
+          count[static_cast<std::size_t>(storage.time)] = isSeries ? selection.steps : 1;
+        }
+        if (selection.layer && storage.z >= 0) {
+          start[static_cast<std::size_t>(storage.z)] = static_cast<std::size_t>(*selection.layer);
+          count[static_cast<std::size_t>(storage.z)] = 1;
+        }
+        reason =
+            state_->ReadInOrder(storage, start, count, static_cast<std::size_t>(item.geometry.nx), part, converter);
+      } else {
+        reason = state_->ReadByBoxes(storage, item, selection.step + i, selection.layer, part, converter);
+      }
+      if (!reason.empty()) {
+        return refused(fmt::format("item {}, step {}: {}", selection.item, selection.step + i + 1, reason));
+      }
+    }
+  } catch (const std::bad_alloc&) {
+    return refused("it needs more than the free memory");
+  }
+  return {};
+}
+
+std::string DataFile::Statistics(int item, ItemStatistics& statistics) const {
+  if (item >= 1 && static_cast<std::size_t>(item) <= Items().size()) {
+    const ItemStorage& storage = state_->header.storages[static_cast<std::size_t>(item - 1)];
+    if (!storage.range.empty()) {
+      statistics = {storage.range[0], storage.range[1], storage.count, true};
+      return {};
+    }
+  }
+  ValueSummary summary;
+  ValueSelection whole;
+  whole.item = item;
+  const bool hasTime = SizeOf(whole) > 0 && Items()[static_cast<std::size_t>(item - 1)].hasTime;
+  const std::size_t steps = hasTime ? Time().steps : 1;
+  try {
+    std::vector<float> values(SizeOf(whole));
+    for (whole.step = 0; whole.step < steps; ++whole.step) {
+      if (std::string error = Read(whole, values); !error.empty()) return error;
+      summary.Add(values);
+    }
+  } catch (const std::bad_alloc&) {
+    return fmt::format("cannot read {}: it needs more than the free memory", Path());
+  }
+  constexpr double kNone = std::numeric_limits<double>::quiet_NaN();
+  statistics = {summary.count > 0 ? static_cast<double>(summary.smallest) : kNone,
+                summary.count > 0 ? static_cast<double>(summary.largest) : kNone, summary.count, false};
+  return {};
+}
+
+}  // namespace tervane

@@ -1,0 +1,94 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "platform/datafile_request.h"
+
+#include <algorithm>
+
+#include <fmt/format.h>
+
+namespace tervane {
+
+namespace {
+
+std::string_view KindOf(int dimensions) {
+  constexpr std::string_view kKinds[] = {"a time series", "a line", "a grid", "layers of grids"};
+  return dimensions >= 0 && dimensions <= 3 ? kKinds[dimensions] : "of unknown dimensions";
+}
+
+std::string NameOfItemType(int code) {
+  const ItemType* type = FindItemType(code);
+  return type != nullptr ? std::string(type->name) : fmt::format("item type {}", code);
+}
+
+std::string WhyTypeIsWrong(int number, const DataItem& item, const std::vector<int>& allowed) {
+  if (allowed.empty() || std::ranges::find(allowed, item.itemType) != allowed.end()) return {};
+  std::string names;
+  for (const int code : allowed) {
+    const bool isLast = code == allowed.back();
+    names += (names.empty() ? "" : isLast ? " or " : ", ") + NameOfItemType(code);
+  }
+  return fmt::format("item {} {}, {} was expected", number,
+                     item.itemType == kUndefinedItemType ? "has no item type" : "is " + NameOfItemType(item.itemType),
+                     names);
+}
+
+std::string WhyPeriodIsNotCovered(const DataItem& item, const TimeAxis& time, const DataFileRequest::Period& period) {
+  // What holds always covers everything.
+  if (!item.hasTime) return {};
+  if (time.stamps.empty()) return "the file has no dates";
+  // Over steps, the first value holds from the begin of its interval.
+  const bool isOfSteps = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
+  const CYbDateTime start = isOfSteps && time.begin ? *time.begin : time.Start();
+  const bool isLate = period.start < start, isShort = time.End() < period.end;
+  if (!isLate && !isShort) return {};
+  const std::string simulation =
+      !isShort  ? fmt::format("starts at {}", DateInWords(period.start))
+      : !isLate ? fmt::format("runs to {}", DateInWords(period.end))
+                : fmt::format("runs from {} to {}", DateInWords(period.start), DateInWords(period.end));
+  return fmt::format("the file covers {} to {}, the simulation {}", DateInWords(start), DateInWords(time.End()),
+                     simulation);
+}
+
+std::string Plural(std::size_t count, std::string_view one, std::string_view many) {
+  return fmt::format("{} {}", count == 1 ? "one" : std::to_string(count), count == 1 ? one : many);
+}
+
+}  // namespace
+
+std::string WhyNotMet(const DataFile& file, std::span<const int> items, const DataFileRequest& request) {
+  constexpr int kFirst[] = {1};
+  if (items.empty()) items = kFirst;
+  for (const int number : items) {
+    if (number < 1 || static_cast<std::size_t>(number) > file.Items().size()) {
+      return fmt::format("there is no item {}: the file has {}", number, file.Items().size());
+    }
+    const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)];
+    if (request.dimensions && item.dimensions != *request.dimensions) {
+      return fmt::format("item {} is {}, {} was expected", number, KindOf(item.dimensions),
+                         KindOf(*request.dimensions));
+    }
+    if (std::string reason = WhyTypeIsWrong(number, item, request.itemTypes); !reason.empty()) return reason;
+    const std::size_t steps = item.hasTime ? file.Time().steps : 1;
+    if (request.steps && steps != *request.steps) {
+      return fmt::format("the file has {}, {} expected", Plural(steps, "time step", "time steps"),
+                         *request.steps == 1 ? "one was" : fmt::format("{} were", *request.steps));
+    }
+    if (steps == 0) return "the file has no time steps";
+    if (!request.period) continue;
+    if (std::string reason = WhyPeriodIsNotCovered(item, file.Time(), *request.period); !reason.empty()) return reason;
+  }
+  return {};
+}
+
+std::string WhyNotMet(const std::string& path, std::span<const int> items, const DataFileRequest& request) {
+  DataFile file;
+  std::string error = file.Open(path);
+  return error.empty() ? WhyNotMet(file, items, request) : error;
+}
+
+std::string DateInWords(const CYbDateTime& date) {
+  const bool isMidnight = date.Hour() == 0 && date.Minute() == 0 && date.Second() == 0;
+  return date.Format(isMidnight ? "%Y-%m-%d" : date.Second() == 0 ? "%Y-%m-%d %H:%M" : "%Y-%m-%d %H:%M:%S");
+}
+
+}  // namespace tervane
