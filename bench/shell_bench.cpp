@@ -12,14 +12,13 @@
 #include <QScrollArea>
 #include <QTemporaryDir>
 #include <algorithm>
-#include <chrono>
 #include <cstdlib>
 #include <string>
 #include <vector>
 
 #include <fmt/format.h>
 
-#include "bench/median_table.h"
+#include "bench/desktop_figures.h"
 #include "document/edit_session.h"
 #include "pages/tree_entries.h"
 #include "platform/files.h"
@@ -35,33 +34,6 @@
 namespace tervane::bench {
 
 namespace {
-
-constexpr int kRepetitions = 10;
-
-double Milliseconds(const std::function<void()>& measured) {
-  const auto start = std::chrono::steady_clock::now();
-  measured();
-  return std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - start).count();
-}
-
-double Median(std::vector<double> times) {
-  std::ranges::sort(times);
-  return times[times.size() / 2];
-}
-
-double MedianOf(const std::function<void()>& measured) {
-  std::vector<double> times;
-  for (int i = 0; i < kRepetitions; ++i) times.push_back(Milliseconds(measured));
-  return Median(times);
-}
-
-void Tell(const std::string& what, double figure, double limit, const char* unit) {
-  fmt::print("{:<64} {:>8.1f} {:<2}  limit {:>4.0f}  {}\n", what, figure, unit, limit, Verdict(figure, limit));
-}
-
-void TellPeer(const std::string& what, double figure, const char* unit) {
-  fmt::print("{:<64} {:>8.1f} {}\n", what, figure, unit);
-}
 
 /// Layouts and drawing are part of what a user waits for.
 void Settle(QWidget& window) {

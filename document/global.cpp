@@ -16,6 +16,9 @@
 #include "simspec/extra_params.h"
 #include "simspec/introduction.h"
 #include "simspec/model_components.h"
+#include "spatial/data2d.h"
+#include "spatial/domain.h"
+#include "spatial/zones.h"
 
 namespace tervane {
 
@@ -40,6 +43,10 @@ constexpr std::array kChildren{
     ChildRow{Make<CBasicParaKvf>, "BASICPARAMETERS"},
     ChildRow{Make<CModelCompWQKvf>, "MODEL_COMP_WQ"},
     ChildRow{Make<CModelCompPTKvf>, "MODEL_COMP_PT"},
+    ChildRow{Make<CCatchmentKvf>, "CATCHMENT"},
+    ChildRow{Make<CSubcatchmentKvf>, "SUBCATCHMENT"},
+    ChildRow{Make<CTopographyKvf>, "TOPOGRAPHY"},
+    ChildRow{Make<CDummySatZoneKvf>, ""},
     ChildRow{Make<CExtraParamsKvf>, ""},
     ChildRow{Make<CExecuteEngineFlagsKvf>, "EXECUTE_ENGINE_FLAGS"},
     ChildRow{Make<COverviewKvf>, "OVERVIEW"},

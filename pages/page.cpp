@@ -40,12 +40,20 @@ std::string CYbSEDlgBase::Enter(Control& control, const std::string& typed) {
   if (!control.enter || !control.IsEnabled()) return "this value cannot be changed here";
   if (control.Text() == typed) return {};
   if (std::string expected = control.enter(typed); !expected.empty()) return expected;
+  Took(control);
+  return {};
+}
+
+void CYbSEDlgBase::Browse(Control& control) {
+  if (control.IsEnabled() && control.browse && control.browse(Outside())) Took(control);
+}
+
+void CYbSEDlgBase::Took(const Control& control) {
+  const int hint = control.hint | (control.then ? control.then() : 0);
   if (control.revalidates && node_.GetRoot()) node_.GetRoot()->ReValidate();
   if (control.revalidatesLater) node_.SetRevalidateAll();
   SetData();
-  UpdateDoc(control.hint, fmt::format("Change {}", ActionName(control.label.empty() ? control.key : control.label)),
-            &control);
-  return {};
+  UpdateDoc(hint, fmt::format("Change {}", ActionName(control.label.empty() ? control.key : control.label)), &control);
 }
 
 void CYbSEDlgBase::Press(const Control& control) const {

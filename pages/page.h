@@ -13,6 +13,8 @@
 
 namespace tervane {
 
+class CYbSEDlgBase;
+
 /// What a page needs of the program around it.
 struct PageContext {
   CYbSEDocument& document;
@@ -20,6 +22,14 @@ struct PageContext {
   /// Marks the document modified and makes the views follow; `action` names what the user did ("Change End Date"),
   /// `source` is the control in which it was done, so that its changes in quick succession are undone as one.
   std::function<void(int hint, const std::string& action, const void* source)> updateDoc;
+  /// Opens a data file in the program's viewer; empty where there is none.
+  std::function<void(const std::string& path)> openDataFile = {};
+  /// Shows another node's page.
+  std::function<void(const CYbSEKvfBase& node)> selectNode = {};
+  /// Shows a form with OK and Cancel. `accept` is asked at OK: it gives why the form must stay, or nothing. False when
+  /// the user gave up.
+  std::function<bool(const std::string& title, CYbSEDlgBase& form, const std::function<std::string()>& accept)>
+      runDialog = {};
   /// The user's units; null for base units. They outlive the page.
   const DisplayUnits* displayUnits = nullptr;
 };
@@ -32,6 +42,10 @@ class CYbSEDlgBase {
 
   CYbSEKvfBase& Node() const { return node_; }
   Host& Outside() const { return context_.host; }
+  /// For a form without a document: what follows each change.
+  void FollowItself(std::function<void()> follow) {
+    context_.updateDoc = [follow = std::move(follow)](int, const std::string&, const void*) { follow(); };
+  }
   /// Called once, before the page is shown the first time: makes the form.
   virtual void Initialize();
   /// Called when the page is shown and after every change: what the form's rules do not say themselves.
@@ -42,9 +56,13 @@ class CYbSEDlgBase {
 
   /// The help command. False when the page has no help of its own.
   virtual bool OnHelp() { return false; }
+  /// The refresh command.
+  virtual void OnRefresh() {}
 
   /// Types a value into a control. Gives what was expected when the control refuses it; the node is then unchanged.
   std::string Enter(Control& control, const std::string& typed);
+  /// Lets the user choose a file.
+  void Browse(Control& control);
   void Press(const Control& control) const;
   /// Types into a cell of a table.
   std::string EnterCell(const Control& table, int row, int column, const std::string& typed);
@@ -67,6 +85,8 @@ class CYbSEDlgBase {
   const PageContext& Context() const { return context_; }
 
  private:
+  /// What follows a value that was taken.
+  void Took(const Control& control);
   /// Tells the document of a change in a table; false when there was none.
   bool Tell(int hint, const std::string& action);
 

@@ -8,6 +8,7 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include "pages/plots.h"
 #include "pages/table_form.h"
 #include "platform/paths.h"
 #include "platform/text.h"
@@ -15,9 +16,9 @@
 namespace tervane {
 
 std::string_view KindName(ControlKind kind) {
-  constexpr std::array<std::string_view, 17> names{"check",  "radio", "choice",  "text",  "long text", "integer",
-                                                   "number", "date",  "file",    "label", "button",    "table",
-                                                   "shown",  "view",  "browser", "group", "sub-form"};
+  constexpr std::array<std::string_view, 19> names{
+      "check",  "radio", "choice", "text", "long text", "integer", "number", "date",  "file",    "label",
+      "button", "table", "shown",  "view", "browser",   "map",     "chart",  "group", "sub-form"};
   return names[static_cast<std::size_t>(kind)];
 }
 
@@ -70,6 +71,16 @@ Control& PageForm::Check(std::string label, int& flag) {
   return control;
 }
 
+Control& PageForm::Check(std::string label, bool& flag) {
+  Control& control = AddBound(ControlKind::Check, std::move(label), &flag);
+  control.text = [&flag] { return std::string(flag ? "1" : "0"); };
+  control.enter = [&flag](const std::string& typed) {
+    flag = typed == "1";
+    return std::string();
+  };
+  return control;
+}
+
 Control& PageForm::Radio(std::string label, int& value, std::vector<std::string> options) {
   Control& control = Choice(std::move(label), value, std::move(options));
   control.kind = ControlKind::Radio;
@@ -100,6 +111,19 @@ Control& PageForm::Text(std::string label, std::string& value) {
   return control;
 }
 
+Control& PageForm::Text(std::string label, std::function<std::string()> get,
+                        std::function<void(const std::string&)> set) {
+  Control& control = Add(ControlKind::Text, std::move(label));
+  control.text = std::move(get);
+  control.enter = [set = std::move(set)](const std::string& typed) {
+    std::string value;
+    std::string expected = EnterValue(value, typed);
+    if (expected.empty()) set(value);
+    return expected;
+  };
+  return control;
+}
+
 Control& PageForm::LongText(std::string label, std::string& value) {
   Control& control = Text(std::move(label), value);
   control.kind = ControlKind::LongText;
@@ -110,6 +134,13 @@ Control& PageForm::Integer(std::string label, int& value) {
   Control& control = AddBound(ControlKind::Integer, std::move(label), &value);
   control.text = [&value] { return std::to_string(value); };
   control.enter = [&value](const std::string& typed) { return EnterValue(value, typed); };
+  return control;
+}
+
+Control& PageForm::Integer(std::string label, std::function<int()> get, std::function<void(int)> set) {
+  Control& control = Add(ControlKind::Integer, std::move(label));
+  control.text = [get = std::move(get)] { return std::to_string(get()); };
+  control.enter = [set = std::move(set)](const std::string& typed) { return EnterInt(typed, set); };
   return control;
 }
 
@@ -197,6 +228,18 @@ Control& PageForm::Table(std::shared_ptr<TableForm> table) {
   return control;
 }
 
+Control& PageForm::Map(std::function<MapContent()> content) {
+  Control& control = Add(ControlKind::Map, {});
+  control.map = std::move(content);
+  return control;
+}
+
+Control& PageForm::Chart(std::function<SeriesContent()> content) {
+  Control& control = Add(ControlKind::Chart, {});
+  control.chart = std::move(content);
+  return control;
+}
+
 PageForm& PageForm::Group(std::string title) {
   Control& control = Add(ControlKind::Group, std::move(title));
   control.group = std::make_shared<PageForm>(node_);
@@ -247,6 +290,10 @@ std::string ShownValue(const Control& control) {
                                           : control.Text() + " (not in the list)";
       return Replaced(fmt::format(" = {} of [{}]", shown, fmt::join(options, " | ")), "\n", " ");
     }
+    case ControlKind::Map:
+      return " = " + Replaced(Summary(control.map()), "\n", "\\n");
+    case ControlKind::Chart:
+      return " = " + Replaced(Summary(control.chart()), "\n", "\\n");
     case ControlKind::Label:
     case ControlKind::Button:
     case ControlKind::Group:

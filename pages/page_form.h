@@ -19,8 +19,12 @@
 
 namespace tervane {
 
+class CData2DShpFile;
+class DataFileNode;
 class PageForm;
 class TableForm;
+struct MapContent;
+struct SeriesContent;
 
 /// Bits of a change that views are told of.
 enum UpdateHint : int {
@@ -48,6 +52,8 @@ enum class ControlKind {
   Shown,     ///< A value that is only shown.
   TextView,  ///< A text that is only read.
   Browser,   ///< A help page.
+  Map,       ///< Grids, shapes and points from above.
+  Chart,     ///< Curves over time.
   Group,     ///< A frame with a title around further controls.
   SubForms,  ///< A place at which one of several forms stands.
 };
@@ -69,6 +75,10 @@ class Control {
   /// Takes a typed value; gives what was expected when it is none, and then changes nothing.
   std::function<std::string(const std::string&)> enter;
   std::function<void()> press;  ///< Of a button.
+  /// Of a file: asks for one and what is chosen in it. False when the user gave up.
+  std::function<bool(Host&)> browse;
+  /// What a taken value brings with it; gives further hints of the change.
+  std::function<int()> then;
   std::function<bool()> enabledWhen, shownWhen;
   bool beside = false;  ///< Stands in the same row as the control before it.
   int hint = kDataChanged;
@@ -78,6 +88,8 @@ class Control {
   std::vector<std::shared_ptr<PageForm>> subForms;
   std::function<int()> currentSubForm;  ///< Which one is shown.
   std::shared_ptr<TableForm> table;
+  std::function<MapContent()> map;       ///< What a map shows now.
+  std::function<SeriesContent()> chart;  ///< What a chart shows now.
 
   bool IsEnabled() const { return !enabledWhen || enabledWhen(); }
   bool IsShown() const { return !shownWhen || shownWhen(); }
@@ -103,6 +115,7 @@ class Control {
   Control& Revalidates() { return revalidates = true, *this; }
   Control& RevalidatesLater() { return revalidatesLater = true, *this; }
   Control& Hint(int hint_) { return hint = hint_, *this; }
+  Control& Then(std::function<int()> then_) { return then = std::move(then_), *this; }
   Control& Filter(std::string filter) { return fileQuestion.filter = std::move(filter), *this; }
   Control& DefaultExtension(std::string extension) {
     return fileQuestion.defaultExtension = std::move(extension), *this;
@@ -116,6 +129,7 @@ class PageForm {
 
   /// A flag of the node, 0 or 1.
   Control& Check(std::string label, int& flag);
+  Control& Check(std::string label, bool& flag);
   Control& Radio(std::string label, int& value, std::vector<std::string> options);
   Control& Choice(std::string label, int& value, std::vector<std::string> options);
   /// The same for a value that is not a member.
@@ -125,8 +139,10 @@ class PageForm {
   Control& Choice(std::string label, std::function<int()> get, std::function<void(int)> set,
                   std::function<std::vector<std::string>()> options);
   Control& Text(std::string label, std::string& value);
+  Control& Text(std::string label, std::function<std::string()> get, std::function<void(const std::string&)> set);
   Control& LongText(std::string label, std::string& value);
   Control& Integer(std::string label, int& value);
+  Control& Integer(std::string label, std::function<int()> get, std::function<void(int)> set);
   /// A number as it is stored, unless `Quantity` is said behind it. `format` is a printf format of one double, such as
   /// "%.1e"; empty for the shortest form.
   Control& Number(std::string label, float& value, std::string format = {});
@@ -134,6 +150,10 @@ class PageForm {
   Control& Date(std::string label, CYbDateTime& value);
   Control& Date(std::string label, std::function<CYbDateTime()> get, std::function<void(const CYbDateTime&)> set);
   Control& File(std::string label, FileName& value);
+  /// A data file with the item that is chosen in it, by the request of its node.
+  Control& DataFile(std::string label, DataFileNode& file);
+  /// A shape file with the attribute that is chosen in it.
+  Control& ShapeFile(std::string label, CData2DShpFile& file);
   Control& Label(std::string text);
   Control& Button(std::string label, std::function<void()> press);
   Control& TextView(std::string label, std::function<std::string()> text);
@@ -141,6 +161,11 @@ class PageForm {
   /// A value that is only shown.
   Control& Shown(std::string label, std::function<std::string()> text);
   Control& Table(std::shared_ptr<TableForm> table);
+  /// What it shows is asked for anew whenever the page is brought in step with its node, so it must be at hand: grids
+  /// and shapes are shared, not made for each call.
+  Control& Map(std::function<MapContent()> content);
+  /// The same for a chart.
+  Control& Chart(std::function<SeriesContent()> content);
   /// A frame with a title; the controls are added to the form that it holds.
   PageForm& Group(std::string title);
   /// The same, in one row with the group before it.

@@ -11,7 +11,12 @@
 #include "pages/simspec/components_pages.h"
 #include "pages/simspec/control_pages.h"
 #include "pages/simspec/period_pages.h"
+#include "pages/spatial/data2d_pages.h"
+#include "pages/spatial/domain_pages.h"
+#include "pages/spatial/station_pages.h"
+#include "pages/spatial/zone_pages.h"
 #include "simspec/pages.h"
+#include "spatial/pages.h"
 
 namespace tervane {
 
@@ -33,6 +38,14 @@ const std::array kPages{
     PageRow{kHelpPage, Make<CTvnHelpView, CYbSEKvfBase>},
     PageRow{kOverviewPage, Make<COverviewDlg, COverviewKvf>},
     PageRow{kDisplayPage, Make<CDisplayDlg, COverlaysKvf>},
+    PageRow{kCatchmentPage, Make<CCatchmentDlg, CCatchmentKvf>},
+    PageRow{kData2DPage, Make<CData2DDlg, CData2DKvf>},
+    PageRow{kSubcatchmentPage, Make<CSubcatchmentDlg, CodedZonesKvf>},
+    PageRow{kSubcatchmentPropPage, Make<CSubcatchmentPropDlg, CSubcatchmentPropKvf>},
+    PageRow{kRiverLinksPage, Make<CSubcatchmentRiverLinksDlg, CSubcatchmentRiverlinksListKvf>},
+    PageRow{kStationBasedDataPage, Make<C2DStationBasedDataDlg, C2DStationBasedDataKvf>},
+    PageRow{kStationPage, Make<C2DStationBaseDataTimeSeriesDlg, C2DStationBasedDataTimeSeriesKvf>},
+    PageRow{kTimeseriesConstPage, Make<CTimeseriesConstDlg, CTimeseriesConstKvf>},
     PageRow{kBasicParaPage, Make<CBasicParaDlg, CBasicParaKvf>},
     PageRow{kModelCompWQPage, Make<CModelCompWQDlg, CModelCompWQKvf>},
     PageRow{kModelCompPTPage, Make<CModelCompPTDlg, CModelCompPTKvf>},

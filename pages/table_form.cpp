@@ -13,11 +13,13 @@
 namespace tervane {
 
 std::string CellText(int value) { return std::to_string(value); }
+std::string CellText(float value) { return ShortestNumber(value); }
 std::string CellText(double value) { return ShortestNumber(value); }
 std::string CellText(const std::string& value) { return value; }
 std::string CellText(const FileName& value) { return value.Text(); }
 
 std::string TakeCell(int& value, const std::string& typed, const CYbSEKvfBase&) { return EnterValue(value, typed); }
+std::string TakeCell(float& value, const std::string& typed, const CYbSEKvfBase&) { return EnterValue(value, typed); }
 std::string TakeCell(double& value, const std::string& typed, const CYbSEKvfBase&) { return EnterValue(value, typed); }
 std::string TakeCell(std::string& value, const std::string& typed, const CYbSEKvfBase&) {
   return EnterValue(value, typed);
@@ -35,7 +37,8 @@ std::string TableForm::Cell(int row, int column) const {
   CYbSEKvfBase* item = list_.GetItemNode(row);
   const TableColumn* shown = ColumnAt(column);
   if (!item || !shown) return {};
-  return shown->HasUnit() ? ShownNumber(*shown->number(*item), UnitOf(*shown)) : shown->text(*item);
+  if (!shown->HasUnit()) return shown->text(*item);
+  return std::visit([&](auto* number) { return ShownNumber(*number, UnitOf(*shown)); }, shown->number(*item));
 }
 
 std::string TableForm::Enter(int row, int column, const std::string& typed) {
@@ -43,7 +46,8 @@ std::string TableForm::Enter(int row, int column, const std::string& typed) {
   const TableColumn* target = ColumnAt(column);
   if (!item || !target) return "there is no such cell";
   if (IsReadOnly(row, column)) return "the cell cannot be changed";
-  return target->HasUnit() ? EnterNumber(*target->number(*item), typed, UnitOf(*target)) : target->enter(*item, typed);
+  if (!target->HasUnit()) return target->enter(*item, typed);
+  return std::visit([&](auto* number) { return EnterNumber(*number, typed, UnitOf(*target)); }, target->number(*item));
 }
 
 // ---- What a view asks
@@ -275,9 +279,13 @@ CellsResult TableForm::FillDown(const CellRange& cells) {
       const TableColumn* target = ColumnAt(column);
       if (!target || !target->HasUnit() || IsReadOnly(row, column)) continue;
       // The shown text of a converted number does not hold all of its digits.
-      double& number = *target->number(*list_.GetItemNode(row));
-      if (number != *target->number(*source)) result.hint |= kDataChanged;
-      number = *target->number(*source);
+      std::visit(
+          [&]<class Real>(Real* number) {
+            const Real given = *std::get<Real*>(target->number(*source));
+            if (*number != given) result.hint |= kDataChanged;
+            *number = given;
+          },
+          target->number(*list_.GetItemNode(row)));
     }
   }
   return result;

@@ -4,6 +4,7 @@
 
 #include <functional>
 #include <string>
+#include <variant>
 #include <vector>
 
 #include "core/list.h"
@@ -47,9 +48,10 @@ struct TableColumn {
   std::vector<std::string> choices;
   std::function<bool(CYbSEKvfBase& item)> readOnly;
   std::string toolTip;
-  std::string unit;                              ///< A fixed unit of the numbers, as of a control.
-  int itemType = 0;                              ///< The numbers are quantities of that item type; 0 for none.
-  std::function<double*(CYbSEKvfBase&)> number;  ///< The number of a cell, where the column holds numbers.
+  std::string unit;  ///< A fixed unit of the numbers, as of a control.
+  int itemType = 0;  ///< The numbers are quantities of that item type; 0 for none.
+  /// The number of a cell, where the column holds numbers.
+  std::function<std::variant<float*, double*>(CYbSEKvfBase&)> number;
 
   /// The numbers are shown and typed in a unit, which then goes before `text` and `enter`.
   bool HasUnit() const { return number && (itemType != 0 || !unit.empty()); }
@@ -58,10 +60,12 @@ struct TableColumn {
 // A value in a cell: as it is shown, and typed. A value that the cell refuses is told and does not reach the item.
 
 std::string CellText(int value);
+std::string CellText(float value);
 std::string CellText(double value);
 std::string CellText(const std::string& value);
 std::string CellText(const FileName& value);
 std::string TakeCell(int& value, const std::string& typed, const CYbSEKvfBase& item);
+std::string TakeCell(float& value, const std::string& typed, const CYbSEKvfBase& item);
 std::string TakeCell(double& value, const std::string& typed, const CYbSEKvfBase& item);
 std::string TakeCell(std::string& value, const std::string& typed, const CYbSEKvfBase& item);
 std::string TakeCell(FileName& value, const std::string& typed, const CYbSEKvfBase& item);
@@ -86,8 +90,10 @@ class TableForm {
     column.enter = [get](CYbSEKvfBase& item, const std::string& typed) {
       return TakeCell(get(static_cast<Item&>(item)), typed, item);
     };
-    if constexpr (std::is_same_v<decltype(get(std::declval<Item&>())), double&>)
-      column.number = [get](CYbSEKvfBase& item) { return &get(static_cast<Item&>(item)); };
+    if constexpr (std::is_floating_point_v<std::remove_reference_t<decltype(get(std::declval<Item&>()))>>)
+      column.number = [get](CYbSEKvfBase& item) -> std::variant<float*, double*> {
+        return &get(static_cast<Item&>(item));
+      };
     return column;
   }
   /// The same for a choice, stored by its number from 0.

@@ -32,6 +32,21 @@ class Host {
   virtual std::optional<std::string> AskFileToOpen(const FileQuestion& question) = 0;
   virtual std::optional<std::string> AskFileToSave(const FileQuestion& question) = 0;
 
+  /// What is chosen among the contents of a file: a row of texts each, with why it cannot be chosen.
+  struct ItemQuestion {
+    struct Row {
+      std::vector<std::string> cells;
+      std::string refusal;  ///< Empty when it may be chosen.
+    };
+    std::string title;
+    std::string file;
+    std::vector<std::string> heads;
+    std::vector<Row> rows;
+    int current = -1;  ///< The row that is chosen at first.
+  };
+  /// The chosen row, or nothing when the user gave up or no row may be chosen.
+  virtual std::optional<int> AskItem(const ItemQuestion& question) = 0;
+
   virtual void OpenBrowser(const std::string& address) = 0;
 
   /// A setting of the program, "" when it was never set.
@@ -45,6 +60,7 @@ class NobodyToAsk : public Host {
   Answer Ask(const std::string& /*text*/, Icon /*icon*/, Buttons /*buttons*/) override { return Answer::Cancel; }
   std::optional<std::string> AskFileToOpen(const FileQuestion& /*question*/) override { return std::nullopt; }
   std::optional<std::string> AskFileToSave(const FileQuestion& /*question*/) override { return std::nullopt; }
+  std::optional<int> AskItem(const ItemQuestion& /*question*/) override { return std::nullopt; }
   void OpenBrowser(const std::string& /*address*/) override {}
   std::string Setting(const std::string& /*name*/) const override { return {}; }
   void SetSetting(const std::string& /*name*/, const std::string& /*value*/) override {}

@@ -26,7 +26,11 @@
 #include <QWidgetAction>
 
 #include "pages/document/help_pages.h"
+#include "pages/plots.h"
+#include "shell/map_canvas.h"
+#include "shell/map_view.h"
 #include "shell/qt_text.h"
+#include "shell/series_plot.h"
 #include "shell/table_view.h"
 #include "shell/theme.h"
 
@@ -343,6 +347,12 @@ class LineWidget : public ControlWidget {
   }
   void Browse() {
     Commit();
+    if (Described().browse) {
+      const QPointer<LineWidget> self(this);
+      Page().Browse(Described());
+      if (self) SyncValue();
+      return;
+    }
     Host::FileQuestion question = Described().fileQuestion;
     const CYbSEKvfGlobalBase* root = Page().Node().GetRoot();
     question.current = FileName(Described().Text(), root ? root->SetupFolder() : std::string()).Absolute();
@@ -509,6 +519,40 @@ class TableWidget : public ControlWidget {
   TableView* table_;
 };
 
+class MapWidget : public ControlWidget {
+ public:
+  MapWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    view_ = new MapView(page.Outside());
+    MakeField(view_, true);
+  }
+  bool GrowsDown() const override { return true; }
+  bool GrowsRight() const override { return true; }
+  QWidget* FocusTarget() const override { return &view_->Canvas(); }
+
+ protected:
+  void SyncValue() override { view_->Show(Described().map(), Described().displayUnits); }
+
+ private:
+  MapView* view_;
+};
+
+class ChartWidget : public ControlWidget {
+ public:
+  ChartWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    plot_ = new SeriesPlot(page.Outside());
+    MakeField(plot_, true);
+  }
+  bool GrowsDown() const override { return true; }
+  bool GrowsRight() const override { return true; }
+  QWidget* FocusTarget() const override { return plot_->FocusTarget(); }
+
+ protected:
+  void SyncValue() override { plot_->Show(Described().chart()); }
+
+ private:
+  SeriesPlot* plot_;
+};
+
 }  // namespace
 
 ControlWidget::ControlWidget(CYbSEDlgBase& page, Control& control) : page_(page), control_(control) {}
@@ -541,6 +585,10 @@ std::unique_ptr<ControlWidget> ControlWidget::Make(CYbSEDlgBase& page, Control& 
       return std::make_unique<TextViewWidget>(page, control);
     case ControlKind::Browser:
       return std::make_unique<BrowserWidget>(page, control);
+    case ControlKind::Map:
+      return std::make_unique<MapWidget>(page, control);
+    case ControlKind::Chart:
+      return std::make_unique<ChartWidget>(page, control);
     case ControlKind::Group:
     case ControlKind::SubForms:
       break;

@@ -18,6 +18,7 @@
 #include "pages/tree_entries.h"
 #include "shell/find_panel.h"
 #include "shell/findings_view.h"
+#include "shell/form_dialog.h"
 #include "shell/log_view.h"
 #include "shell/node_tree.h"
 #include "shell/page_view.h"
@@ -180,8 +181,15 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
   PageContext context{session_->Document(), host_,
                       [this, &node](int hint, const std::string& action, const void* source) {
                         session_->UpdateDoc(node, hint, action, source);
-                      },
-                      &program_.Units()};
+                      }};
+  context.displayUnits = &program_.Units();
+  context.openDataFile = [this](const std::string& path) { emit DataFileWanted(ToQt(path)); };
+  context.selectNode = [this](const CYbSEKvfBase& other) {
+    QTimer::singleShot(0, this, [this, serial = other.Serial()] { GoTo(serial); });
+  };
+  context.runDialog = [this](const std::string& title, CYbSEDlgBase& form, const std::function<std::string()>& accept) {
+    return FormDialog(Translated(title), form, accept, this).exec() == QDialog::Accepted;
+  };
   auto made = MakePage(*pageClass, node, std::move(context));
   if (!made) return;
   node.Touch();
@@ -285,6 +293,12 @@ void DocumentFrame::Refresh(int hint) {
   if (hint & ~(kDataChanged | kRefreshPlots)) find_->Forget();
   if (session_->NeedsAutosave()) autosave_.start(kAutosaveDelay);
   emit StateChanged();
+}
+
+void DocumentFrame::RefreshPlots() {
+  Commit();
+  if (page_) page_->Page().OnRefresh();
+  Change(session_->Document().Root(), kRefreshPlots, tr("Refresh"));
 }
 
 void DocumentFrame::Commit() {

@@ -62,6 +62,8 @@ class DocumentFrame : public QWidget {
 
   /// Hands over what was typed and not yet entered; to be called before every command.
   void Commit();
+  /// Looks at the files of the shown page again, and draws all anew.
+  void RefreshPlots();
   void Undo();
   void Redo();
   /// A change that a menu makes in a node that has no page.
@@ -84,6 +86,8 @@ class DocumentFrame : public QWidget {
   void SaveAsWanted();
   void ReloadWanted();
   void ChangesWanted();
+  /// A data file is to be shown in a viewer.
+  void DataFileWanted(const QString& path);
 
  private:
   void BuildBody();

@@ -202,9 +202,8 @@ void MainWindow::BuildViewMenu() {
 }
 
 void MainWindow::BuildRunMenu() {
-  Command& refresh = AddForDocument(
-      nullptr, tr("R&efresh"), "refresh", QKeySequence::Refresh,
-      [](DocumentFrame& frame) { frame.Change(frame.Session().Document().Root(), kRefreshPlots, tr("Refresh")); });
+  Command& refresh = AddForDocument(nullptr, tr("R&efresh"), "refresh", QKeySequence::Refresh,
+                                    [](DocumentFrame& frame) { frame.RefreshPlots(); });
   refresh.action->setToolTip(tr("Refresh graphic"));
   // In a menu bar an icon would take the text's place.
   Command& refreshInBar =

@@ -6,6 +6,8 @@
 #include <QGroupBox>
 #include <QLabel>
 #include <QScrollArea>
+#include <QSplitter>
+#include <QStyle>
 #include <QVBoxLayout>
 #include <algorithm>
 
@@ -19,6 +21,8 @@ namespace tervane {
 namespace {
 
 constexpr int kWidestForm = 860;  ///< In pixels at zoom 1: lines stay short enough to be read.
+constexpr int kSideBySide = 880;  ///< From this width of a page on its map stands beside the form.
+constexpr int kFormBesidePlot = 530;
 constexpr int kMostFindings = 4;  ///< Lines above a form; the tab of findings has them all.
 
 enum Column { kLabelColumn, kFieldColumn };
@@ -38,17 +42,25 @@ struct PageView::SubForms {
   QWidget* place;
 };
 
-PageView::PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path) : page_(std::move(page)) {
+PageView::PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path)
+    : ownPage_(std::move(page)), page_(*ownPage_) {
+  Build(path);
+}
+
+PageView::PageView(CYbSEDlgBase& form) : page_(form) { Build({}); }
+
+void PageView::Build(const QString& path) {
   const Theme& theme = Theme::Get();
   const int margin = theme.Scaled(16);
   auto* all = new QVBoxLayout(this);
   all->setContentsMargins(0, 0, 0, 0);
   all->setSpacing(0);
 
-  auto* head = new QVBoxLayout;
+  auto* top = new QWidget;
+  auto* head = new QVBoxLayout(top);
   head->setContentsMargins(margin, theme.Scaled(12), margin, theme.Scaled(8));
   head->setSpacing(theme.Scaled(2));
-  auto* title = new QLabel(Translated(page_->Node().GetTitle()));
+  auto* title = new QLabel(Translated(page_.Node().GetTitle()));
   QFont bold = title->font();
   bold.setPointSizeF(bold.pointSizeF() * 1.35);
   bold.setWeight(QFont::DemiBold);
@@ -68,9 +80,10 @@ PageView::PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path) : pa
   findings_->setContentsMargins(0, theme.Scaled(6), 0, theme.Scaled(2));
   findings_->hide();
   head->addWidget(findings_);
-  all->addLayout(head);
+  all->addWidget(top);
+  top->setVisible(ownPage_ != nullptr);
 
-  QWidget* form = BuildForm(page_->Form(), 0);
+  QWidget* form = BuildForm(page_.Form(), 0);
   auto* content = new QWidget;
   auto* column = new QVBoxLayout(content);
   column->setContentsMargins(margin, theme.Scaled(4), margin, margin);
@@ -86,12 +99,27 @@ PageView::PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path) : pa
   scroll_->setFrameShape(QFrame::NoFrame);
   scroll_->setWidgetResizable(true);
   scroll_->setWidget(content);
-  all->addWidget(scroll_, 1);
+  if (plots_.empty()) {
+    all->addWidget(scroll_, 1);
+  } else {
+    split_ = new QSplitter;
+    split_->setChildrenCollapsible(false);
+    split_->addWidget(scroll_);
+    split_->addWidget(plotPlace_);
+    split_->setStretchFactor(1, 1);
+    all->addWidget(split_, 1);
+  }
   AlignLabels();
   Sync();
 }
 
 PageView::~PageView() = default;
+
+QSize PageView::WantedSize() const {
+  const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
+  const QSize content = scroll_->widget()->sizeHint();
+  return {std::max(content.width() + bar, Theme::Get().Scaled(520)), content.height() + bar};
+}
 
 QWidget* PageView::BuildForm(PageForm& form, int depth) {
   auto* widget = new QWidget;
@@ -109,6 +137,11 @@ QWidget* PageView::BuildForm(PageForm& form, int depth) {
     row.clear();
   };
   for (const auto& control : form.Controls()) {
+    const bool isPlot = control->kind == ControlKind::Map || control->kind == ControlKind::Chart;
+    if (isPlot && &form == &page_.Form()) {
+      AddPlot(*control);
+      continue;
+    }
     if (!control->beside) finish();
     row.push_back(control.get());
   }
@@ -138,7 +171,7 @@ QWidget* PageView::BuildCell(Control& control, int depth) {
     }
     return place;
   }
-  ControlWidget& made = *widgets_.emplace_back(ControlWidget::Make(*page_, control));
+  ControlWidget& made = *widgets_.emplace_back(ControlWidget::Make(page_, control));
   connect(&made, &ControlWidget::UnitChosen, this, &PageView::UnitChosen);
   growsDown_ |= made.GrowsDown();
   growsRight_ |= made.GrowsRight();
@@ -197,6 +230,37 @@ void PageView::AddRow(Form& built, const std::vector<Control*>& row) {
   if (growsDown) grid.setRowStretch(line, 1);
 }
 
+void PageView::AddPlot(Control& control) {
+  if (!plotPlace_) {
+    plotPlace_ = new QWidget;
+    auto* column = new QVBoxLayout(plotPlace_);
+    const int margin = Theme::Get().Scaled(8);
+    column->setContentsMargins(margin, 0, margin, margin);
+  }
+  ControlWidget& made = *widgets_.emplace_back(ControlWidget::Make(page_, control));
+  plotPlace_->layout()->addWidget(made.Field());
+  plots_.push_back(&control);
+}
+
+void PageView::PlacePlots() {
+  const Theme& theme = Theme::Get();
+  const bool isWide = width() >= theme.Scaled(kSideBySide);
+  const auto orientation = isWide ? Qt::Horizontal : Qt::Vertical;
+  if (split_->orientation() == orientation && split_->property("placed").toBool()) return;
+  split_->setProperty("placed", true);
+  split_->setOrientation(orientation);
+  const int all = isWide ? width() : height();
+  const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
+  const int needed = scroll_->widget()->minimumSizeHint().width() + bar;
+  const int form = isWide ? std::clamp(needed, theme.Scaled(kFormBesidePlot), all * 3 / 5) : all / 2;
+  split_->setSizes({form, std::max(all - form, 1)});
+}
+
+void PageView::resizeEvent(QResizeEvent* event) {
+  QWidget::resizeEvent(event);
+  if (split_) PlacePlots();
+}
+
 void PageView::AlignLabels() {
   // A group's frame moves its content to the right by its margin: labels inside are that much narrower.
   const int step = Theme::Get().Scaled(10) + 3;
@@ -230,6 +294,8 @@ void PageView::Sync() {
     box->setEnabled(std::ranges::any_of(inside, [](const auto& each) { return each->IsEnabled(); }));
   }
   for (const auto& widget : widgets_) widget->Sync();
+  if (plotPlace_)
+    plotPlace_->setVisible(std::ranges::any_of(plots_, [](const Control* control) { return control->IsShown(); }));
   SyncFindings();
 }
 
@@ -246,7 +312,7 @@ void PageView::SyncFindings() {
     lines += QString("<div><b style='color:%1'>%2</b>&nbsp; %3</div>")
                  .arg(color.name(), isError ? tr("Error") : tr("Warning"), text);
   };
-  for (const Finding& finding : page_->Node().Findings()) add(finding);
+  for (const Finding& finding : page_.Node().Findings()) add(finding);
   if (count > kMostFindings) lines += "<div>" + tr("and %n more", nullptr, count - kMostFindings) + "</div>";
   findings_->setText(lines);
   findings_->setVisible(count > 0);

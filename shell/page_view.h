@@ -12,6 +12,7 @@
 class QGridLayout;
 class QLabel;
 class QScrollArea;
+class QSplitter;
 
 namespace tervane {
 
@@ -24,9 +25,13 @@ class PageView : public QWidget {
  public:
   /// `path` is shown below the title.
   PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path);
+  /// The form alone, of a dialog that owns it.
+  explicit PageView(CYbSEDlgBase& form);
   ~PageView() override;
 
-  CYbSEDlgBase& Page() const { return *page_; }
+  CYbSEDlgBase& Page() const { return page_; }
+  /// The size at which nothing needs to be scrolled.
+  QSize WantedSize() const;
   /// Shows what the node holds now.
   void Sync();
   /// Hands over what was typed and not yet entered.
@@ -37,6 +42,9 @@ class PageView : public QWidget {
  signals:
   void UnitChosen(int itemType, int unit);
 
+ protected:
+  void resizeEvent(QResizeEvent* event) override;
+
  private:
   struct Form;  ///< A grid of one form, group or sub-form.
   struct SubForms;
@@ -45,15 +53,24 @@ class PageView : public QWidget {
   /// Places one control, or several that stand beside each other, in the next row.
   void AddRow(Form& grid, const std::vector<Control*>& row);
   QWidget* BuildCell(Control& control, int depth);
+  /// A map or chart of the page itself stands beside the form, or below it where the page is narrow.
+  void AddPlot(Control& control);
+  void PlacePlots();
   void AlignLabels();
   void SyncFindings();
 
-  std::unique_ptr<CYbSEDlgBase> page_;
+  void Build(const QString& path);
+
+  std::unique_ptr<CYbSEDlgBase> ownPage_;
+  CYbSEDlgBase& page_;
   std::vector<std::unique_ptr<ControlWidget>> widgets_;
   std::vector<std::unique_ptr<Form>> forms_;
   std::vector<std::unique_ptr<SubForms>> subForms_;
   /// Groups, whose frames follow the rules of their controls.
   std::vector<std::pair<const Control*, QWidget*>> groups_;
+  std::vector<const Control*> plots_;
+  QSplitter* split_ = nullptr;
+  QWidget* plotPlace_ = nullptr;
   QLabel* findings_;
   QScrollArea* scroll_;
   bool growsDown_ = false, growsRight_ = false;

@@ -7,6 +7,7 @@
 #include <QMessageBox>
 #include <QUrl>
 
+#include "shell/item_dialog.h"
 #include "shell/qt_text.h"
 
 namespace tervane {
@@ -79,6 +80,11 @@ std::optional<std::string> QtHost::AskFileToSave(const FileQuestion& question) {
   if (!question.current.empty()) dialog.selectFile(ToQt(question.current));
   if (dialog.exec() != QDialog::Accepted || dialog.selectedFiles().isEmpty()) return std::nullopt;
   return FromQt(dialog.selectedFiles().constFirst());
+}
+
+std::optional<int> QtHost::AskItem(const ItemQuestion& question) {
+  ItemDialog dialog(question, window_);
+  return dialog.exec() == QDialog::Accepted ? std::optional(dialog.Chosen()) : std::nullopt;
 }
 
 void QtHost::OpenBrowser(const std::string& address) { QDesktopServices::openUrl(QUrl(ToQt(address))); }

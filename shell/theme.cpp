@@ -87,12 +87,14 @@ void Theme::Apply() {
   QFont font = QApplication::font();
   font.setPointSizeF(basePointSize_ * zoom_);
   QApplication::setFont(font);
+  icons_.clear();
   emit Changed();
 }
 
 int Theme::Scaled(int pixels) const { return static_cast<int>(std::lround(pixels * zoom_)); }
 
 QIcon Theme::Icon(const QString& name) const {
+  if (const auto known = icons_.constFind(name); known != icons_.constEnd()) return *known;
   QFile file(":/icons/" + name + ".svg");
   if (!file.open(QIODevice::ReadOnly)) return {};
   const QByteArray drawing = file.readAll();
@@ -112,6 +114,7 @@ QIcon Theme::Icon(const QString& name) const {
   // Without a drawing of its own the style tints that of a selected row.
   add(QIcon::Selected, palette.color(QPalette::Active, QPalette::ButtonText));
   add(QIcon::Disabled, palette.color(QPalette::Disabled, QPalette::ButtonText));
+  icons_.insert(name, icon);
   return icon;
 }
 

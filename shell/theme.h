@@ -5,6 +5,7 @@
 #pragma once
 
 #include <QColor>
+#include <QHash>
 #include <QIcon>
 #include <QObject>
 #include <QString>
@@ -54,6 +55,7 @@ class Theme : public QObject {
   bool isDark_ = false;
   double zoom_ = 1;
   double basePointSize_ = 10;
+  mutable QHash<QString, QIcon> icons_;  ///< Drawn for the present colours.
 };
 
 }  // namespace tervane

@@ -4,9 +4,45 @@
 
 #include <fmt/format.h>
 
+#include "core/kvf.h"
 #include "pages/document/help_pages.h"
+#include "pages/spatial/plot_content.h"
+#include "platform/files.h"
+#include "platform/grid_files.h"
+#include "platform/paths.h"
+#include "platform/text.h"
+#include "platform/units.h"
 
 namespace tervane {
+
+namespace {
+
+/// The corners that the reference of an image tells, a parameter file; nothing, and the user is told why, when it
+/// cannot be read.
+std::optional<DataArea> ReadImagePlace(const std::string& path, Host& host) {
+  if (!FileExists(path)) {
+    host.Tell("Can not open file", Host::Icon::Error);
+    return std::nullopt;
+  }
+  kvfGetErrorGlb();  // what an earlier reader left
+  KvfFile* file = kvfLoadFile(path, 0);
+  if (kvfGetErrorGlb() != kKvfNoError) {
+    host.Tell(kvfErrorText() + "\n\nSyntax error in file name:\n" + path, Host::Icon::Error);
+    kvfClose(&file);
+    return std::nullopt;
+  }
+  DataArea area;
+  KvfNode* target = kvfTargetByNameNum(file, "QUARZEL_Graphical_Images", 1);
+  KvfNode* place = kvfSectionByNameNum(target, "World_Coordinates", 1);
+  const bool isRead = kvfGetParam(place, "x0", &area.x0, 1, 1) && kvfGetParam(place, "y0", &area.y0, 1, 1) &&
+                      kvfGetParam(place, "x1", &area.x1, 1, 1) && kvfGetParam(place, "y1", &area.y1, 1, 1);
+  kvfClose(&file);
+  if (isRead) return area;
+  host.Tell(path + " tells no place: x0, y0, x1 and y1 were expected in World_Coordinates", Host::Icon::Error);
+  return std::nullopt;
+}
+
+}  // namespace
 
 std::string CTvnHelpView::PageName() const {
   const std::string& name = Node().GetHtml();
@@ -38,8 +74,81 @@ void COverviewDlg::Describe(PageForm& form) {
   form.TextView("", [this] { return Node().Text; });
 }
 
+void CDisplayDlg::SetData() {
+  if (const auto* domain = Node().Important<CCatchmentKvf>("CATCHMENT")) Node().AdoptDomain(domain->GetEnvelope());
+}
+
 void CDisplayDlg::Describe(PageForm& form) {
-  form.Check("Default map display based on the Model Domain", Node().UseModelDomain);
+  COverlaysKvf& n = Node();
+  const auto isFree = [&n] { return n.UseModelDomain == 0; };
+  form.Check("Default map display based on the Model Domain", n.UseModelDomain);
+  const auto corner = [&](PageForm& group, const char* label, double& value) {
+    group.Number(label, value).Quantity(kCoordinateItemType).EnabledWhen(isFree).Then([&n] {
+      n.SetArea({n.x0, n.y0, n.x1, n.y1});
+      return 0;
+    });
+  };
+  PageForm& lower = form.Group("Lower Left corner");
+  corner(lower, "X", n.x0);
+  corner(lower, "Y", n.y0);
+  PageForm& upper = form.GroupBeside("Upper Right corner");
+  corner(upper, "X", n.x1);
+  corner(upper, "Y", n.y1);
+  form.Button("Import...", [this] { Import(); }).EnabledWhen(isFree);
+  form.Map([&n] {
+    const auto* domain = n.Important<CCatchmentKvf>("CATCHMENT");
+    if (!domain) return MapContent();
+    MapContent map = domain->Type == CCatchmentKvf::kGridFile
+                         ? FileMap(domain->GridFile())
+                         : ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
+    for (GridLayer& grid : map.grids) grid.withLegend = false;
+    map.area = Envelope{n.x0, n.y0, n.x1, n.y1};
+    return map;
+  });
+}
+
+void CDisplayDlg::Import() {
+  Host::FileQuestion question;
+  question.filter =
+      "All legal files (*.nds2; *.bmpw; *.shp)|*.nds2; *.bmpw; *.shp|Two Dim Files (*.nds2)|*.nds2|"
+      "Geo Reference Files (*.bmpw)|*.bmpw|Shape Files (*.shp)|*.shp|All Files (*.*)|*.*||";
+  question.defaultExtension = "nds2";
+  const auto path = Outside().AskFileToOpen(question);
+  if (!path) return;
+  const std::string extension = LowerCase(ExtensionOf(*path));
+  std::optional<DataArea> area;
+  if (extension == ".nds2") {
+    GridGeometry geometry;
+    const FileResult result = ReadGeoInfoFromNdsFile(*path, 1, geometry);
+    const Envelope box = EnvelopeOf(geometry);
+    if (result.Ok())
+      area = DataArea{box.xMin, box.yMin, box.xMax, box.yMax};
+    else
+      Outside().Tell(result.error, Host::Icon::Error);
+  } else if (extension == ".bmpw") {
+    area = ReadImagePlace(*path, Outside());
+  } else if (extension == ".shp") {
+    if (!FileExists(*path)) return Outside().Tell("Can not open shape file", Host::Icon::Error);
+    Host::ItemQuestion axis;
+    axis.title = "Shape axis units";
+    axis.file = *path;
+    axis.heads = {"Unit of the coordinates"};
+    const auto units = FindItemType(kCoordinateItemType)->unitKeys;
+    for (const int unit : units) axis.rows.push_back({{std::string(FindUnit(unit)->text)}, {}});
+    axis.current = 0;
+    const auto chosen = Outside().AskItem(axis);
+    if (!chosen) return;
+    CTvnShapeData shapes;
+    shapes.SetAxisLengthUnit(units[static_cast<std::size_t>(*chosen)]);
+    Envelope box;
+    if (const FileResult result = shapes.ReadShapeFile(*path); !result.Ok() || !shapes.GetTranscribingRect(box))
+      Outside().Tell("Can not load shape file\n\n" + result.error, Host::Icon::Error);
+    else
+      area = DataArea{box.xMin, box.yMin, box.xMax, box.yMax};
+  }
+  if (!area) return;
+  Node().SetArea(*area);
+  UpdateDoc(kDataChanged, "Import Area");
 }
 
 }  // namespace tervane

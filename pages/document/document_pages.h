@@ -37,9 +37,14 @@ class COverviewDlg : public PageOf<COverviewKvf> {
 class CDisplayDlg : public PageOf<COverlaysKvf> {
  public:
   using PageOf::PageOf;
+  void SetData() override;
 
  protected:
   void Describe(PageForm& form) override;
+
+ private:
+  /// Takes the corners from a grid, an image's place or a shape file.
+  void Import();
 };
 
 }  // namespace tervane

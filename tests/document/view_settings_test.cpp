@@ -49,7 +49,9 @@ TEST(ViewSettings, WritesTheAreasOfTheRoot) {
   EXPECT_EQ(document.Global().SetMaxDataArea({0, 0, 100, 50}), 0);
   EXPECT_EQ(ValueOf(document, "ViewSettings:MaxZoomDataAreaUndefined"), "0");
   EXPECT_EQ(ValueOf(document, "ViewSettings:MaxZoomDataArea_X1"), "100");
-  EXPECT_EQ(ValueOf(document, "ViewSettings:DefaultZoomDataAreaUndefined"), "1");
+  // A domain without a file has 50 cells of 1000 m each way.
+  EXPECT_EQ(ValueOf(document, "ViewSettings:DefaultZoomDataAreaUndefined"), "0");
+  EXPECT_EQ(ValueOf(document, "ViewSettings:DefaultZoomDataArea_X1"), "50000");
 }
 
 }  // namespace

@@ -39,6 +39,7 @@ section Unknown {
         fmt::format("{} {} {}:{} {}", KindName(finding.kind), finding.line, finding.path, finding.key, node));
   }
   EXPECT_THAT(lines, testing::ElementsAre("note 13 ModelCompWQ:OL ModelCompWQ", "error 0 ModelCompWQ:UZ ModelCompWQ",
+                                          "error 0 Catchment/NDS_2D_DATA_FILE:FILE_NAME Catchment/NDS_2D_DATA_FILE",
                                           "unread 6 SimSpec:Foo: SimSpec", "unread 14 ModelCompWQ/Strange: ModelCompWQ",
                                           "unread 17 Unknown: nowhere"));
 }

@@ -116,12 +116,13 @@ TEST(PageTable, EveryControlTakesItsOwnText) {
     if (!page) return;
     page->Form().ForEach([&](Control& control) {
       // A date list without dates shows none of its options.
-      if (!control.enter || control.Text() == "-1" || control.Text() == "Invalid DateTime.") return;
+      if (!control.enter || !control.IsEnabled() || control.Text() == "-1" || control.Text() == "Invalid DateTime.")
+        return;
       EXPECT_EQ(control.enter(control.Text()), "") << place.path << " " << control.label;
       ++controls;
     });
   });
-  EXPECT_GT(controls, 100);
+  EXPECT_GT(controls, 90);
   EXPECT_EQ(test::SavedText(document), before);
 }
 

@@ -192,7 +192,7 @@ TEST(ModelComponents, WaterQualityOfATwoLayerUnsaturatedZoneIsAnError) {
     choice.own.UZ = c.uz;
     choice.own.UZ_ModelType = c.uzModelType;
     choice.quality.UZ = c.qualityUz;
-    EXPECT_EQ(setup.Root().Validate(), !c.isError);
+    EXPECT_EQ(choice.quality.Validate(), !c.isError);
     ASSERT_EQ(choice.quality.Findings().size(), c.isError ? 1U : 0U);
     if (c.isError) {
       EXPECT_EQ(choice.quality.Findings()[0].text,

@@ -17,6 +17,7 @@ namespace {
 Host::Answer NoQuestions::Ask(const std::string& text, Icon, Buttons) { Unexpected(text); }
 std::optional<std::string> NoQuestions::AskFileToOpen(const FileQuestion& question) { Unexpected(question.title); }
 std::optional<std::string> NoQuestions::AskFileToSave(const FileQuestion& question) { Unexpected(question.title); }
+std::optional<int> NoQuestions::AskItem(const ItemQuestion& question) { Unexpected(question.title); }
 void NoQuestions::OpenBrowser(const std::string& address) { Unexpected(address); }
 std::string NoQuestions::Setting(const std::string&) const { return {}; }
 void NoQuestions::SetSetting(const std::string& name, const std::string&) { Unexpected(name); }

@@ -18,6 +18,7 @@ class NoQuestions : public Host {
   Answer Ask(const std::string& text, Icon icon, Buttons buttons) override;
   std::optional<std::string> AskFileToOpen(const FileQuestion& question) override;
   std::optional<std::string> AskFileToSave(const FileQuestion& question) override;
+  std::optional<int> AskItem(const ItemQuestion& question) override;
   void OpenBrowser(const std::string& address) override;
   std::string Setting(const std::string& name) const override;
   void SetSetting(const std::string& name, const std::string& value) override;

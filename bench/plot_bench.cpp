@@ -1,0 +1,139 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What a user waits for at large maps and long series. Run it with QT_QPA_PLATFORM=offscreen. The peer of a map is the
+// toolkit's own drawing of a picture of as many pixels, turned and shrunk alike.
+#include <QApplication>
+#include <QPainter>
+#include <cmath>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include <qcustomplot.h>
+
+#include "bench/desktop_figures.h"
+#include "shell/map_canvas.h"
+#include "shell/map_view.h"
+#include "shell/series_plot.h"
+#include "shell/theme.h"
+
+namespace tervane::bench {
+
+namespace {
+
+constexpr int kSide = 5000;
+constexpr QSize kSize(1000, 760);
+constexpr int kFrames = 60;
+
+std::shared_ptr<const CTvn2DOrthoRotatedGridData> LargeGrid(double rotation, bool isCodes) {
+  std::vector<float> values(static_cast<std::size_t>(kSide) * kSide);
+  for (int j = 0; j < kSide; ++j) {
+    for (int i = 0; i < kSide; ++i) {
+      const double height =
+          1000 + 800 * std::sin(i / 310.0) * std::cos(j / 270.0) + 150 * std::sin(i / 17.0 + j / 23.0);
+      values[static_cast<std::size_t>(j) * kSide + static_cast<std::size_t>(i)] =
+          static_cast<float>(isCodes ? std::floor(height / 20) : height);
+    }
+  }
+  auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
+  const GridGeometry geometry{kSide, kSide, 25, 400000, 5000000, rotation, {}};
+  const std::string problem = isCodes ? grid->TakeValues(geometry, values, -9999, kWholeNumberUnit, kCodeItemType)
+                                      : grid->TakeValues(geometry, values, -9999, 1000, 100180);
+  if (!problem.empty()) fmt::print("no grid: {}\n", problem);
+  return grid;
+}
+
+void MeasureMap(const std::string& what, double rotation, bool isCodes) {
+  MapContent content;
+  content.grids = {{LargeGrid(rotation, isCodes), isCodes}};
+  NobodyToAsk host;
+  MapView view(host);
+  view.resize(kSize);
+  view.show();
+  QApplication::processEvents();
+  // The window answers at once, and the map appears when its grid is ready.
+  const double answer = Milliseconds([&] {
+    view.Show(content, nullptr);
+    view.Canvas().grab();
+  });
+  const double picture = answer + Milliseconds([&] {
+                           view.Canvas().WaitUntilReady();
+                           view.Canvas().grab();
+                         });
+  Tell(what + ": until the window answers", answer, 30, "ms");
+  Tell(what + ": until the first picture", picture, 1000, "ms");
+  for (const double zoom : {1.0, 8.0}) {
+    view.Canvas().Fit();
+    view.Canvas().Zoom(zoom);
+    const double frames = Milliseconds([&] {
+      for (int i = 0; i < kFrames; ++i) {
+        view.Canvas().Pan({i % 2 == 0 ? 7.0 : -5.0, 3.0});
+        view.Canvas().repaint();
+      }
+    });
+    Tell(fmt::format("{}, zoom {}: a frame of panning ({:.0f} a second)", what, zoom, 1000 * kFrames / frames),
+         frames / kFrames, 1000.0 / 30, "ms");
+  }
+}
+
+void MeasurePeer() {
+  QImage image(kSide, kSide, QImage::Format_RGB32);
+  image.fill(Qt::darkCyan);
+  QImage target(kSize, QImage::Format_RGB32);
+  TellPeer("  peer: the toolkit draws a picture of as many pixels, turned", MedianOf([&] {
+             QPainter painter(&target);
+             painter.rotate(20);
+             painter.scale(0.15, 0.15);
+             painter.drawImage(0, 0, image);
+           }),
+           "ms");
+}
+
+void MeasureSeries() {
+  constexpr std::size_t kValues = 100'000;
+  SeriesContent content;
+  for (const bool isStepped : {false, true}) {
+    Series series{isStepped ? "Rain" : "Flow", isStepped ? "mm" : "m3/s", {}, {}, isStepped};
+    for (std::size_t i = 0; i < kValues; ++i) {
+      series.times.push_back(CYbDateTime(1990, 1, 1) + CYbDateTimeSpan{3600 * static_cast<std::int64_t>(i)});
+      series.values.push_back(50 + 40 * std::sin(static_cast<double>(i) / 900) +
+                              static_cast<double>(i * 7919 % 100) / 10);
+    }
+    content.series.push_back(std::move(series));
+  }
+  NobodyToAsk host;
+  SeriesPlot plot(host);
+  plot.resize(kSize);
+  plot.show();
+  QApplication::processEvents();
+  Tell("2 series of 100,000 values: until the first picture", Milliseconds([&] {
+         plot.Show(content);
+         plot.Chart().replot();
+       }),
+       200, "ms");
+  Tell("the same: zoom and draw", MedianOf([&] {
+         plot.Zoom(1.1);
+         plot.Chart().replot();
+       }),
+       50, "ms");
+  Tell("the same: see that nothing changed", MedianOf([&] { plot.Show(content); }), 16, "ms");
+}
+
+void Measure() {
+  MeasureMap("25 million cells", 0, false);
+  MeasureMap("25 million cells, turned", 20, false);
+  MeasureMap("25 million codes, turned", 20, true);
+  MeasurePeer();
+  MeasureSeries();
+}
+
+}  // namespace
+
+}  // namespace tervane::bench
+
+int main(int argc, char** argv) {
+  QApplication application(argc, argv);
+  const tervane::Theme theme;
+  tervane::bench::Measure();
+}

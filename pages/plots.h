@@ -1,0 +1,93 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What maps and charts of pages show, without any toolkit.
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "platform/dates.h"
+#include "platform/grid.h"
+#include "platform/shapes.h"
+
+namespace tervane {
+
+/// A grid on a map.
+struct GridLayer {
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid;
+  bool isCodes = false;  ///< Whole-number codes: one colour each, the classes of the legend are the codes.
+  std::optional<float> highlighted = {};  ///< Two colours: cells of this value, and the others.
+  bool withLegend = true;
+  double transparency = 0;  ///< 0 opaque, 1 invisible.
+
+  bool operator==(const GridLayer&) const = default;
+};
+
+/// Shapes over a grid.
+struct ShapeLayer {
+  std::shared_ptr<const CYbShapeData> shapes;
+  std::string highlighted = {};  ///< Shapes whose value reads so stand out; empty for none.
+
+  bool operator==(const ShapeLayer&) const = default;
+};
+
+/// Points with names over a grid.
+struct PointLayer {
+  std::vector<MapPoint> points;
+  std::vector<std::string> labels = {};  ///< As many, or none.
+
+  bool operator==(const PointLayer&) const = default;
+};
+
+/// What a user points at.
+struct MapPick {
+  MapPoint place;
+  std::optional<std::pair<int, int>> cell;  ///< Of the first grid.
+  std::optional<float> value;               ///< Of that cell; nothing for an empty one.
+  std::optional<std::size_t> shape;         ///< Of the first layer of shapes, by its place from 0.
+};
+
+/// What a map shows, from the bottom up: grids, shapes, points.
+struct MapContent {
+  std::vector<GridLayer> grids;
+  std::vector<ShapeLayer> shapes;
+  std::vector<PointLayer> points;
+  std::optional<Envelope> area;  ///< Shown at first; the envelope of all layers when nothing is said.
+  std::string message;           ///< Shown in the place of a map that has nothing to show.
+  std::function<void(const MapPick& pick)> picked;  ///< A click of the user; may be empty.
+
+  bool IsEmpty() const { return grids.empty() && shapes.empty() && points.empty(); }
+};
+
+/// One curve of a chart.
+struct Series {
+  std::string name;
+  std::string unit;
+  std::vector<CYbDateTime> times;
+  std::vector<double> values;  ///< As many; NaN for a gap.
+  bool isStepped = false;      ///< The value holds over the interval that ends at its time.
+};
+
+struct SeriesContent {
+  std::vector<Series> series;
+  /// Shaded: the time that is simulated.
+  std::optional<std::pair<CYbDateTime, CYbDateTime>> period;
+  std::string message;  ///< Shown in the place of a chart that has nothing to show.
+
+  bool IsEmpty() const { return series.empty(); }
+};
+
+/// Whether both look the same on the screen: the same grids and shapes (not merely equal ones), and the same rest. What
+/// a click does is not asked.
+bool LooksSame(const MapContent& a, const MapContent& b);
+bool LooksSame(const SeriesContent& a, const SeriesContent& b);
+
+/// In short what is shown, for texts: "grid 142x97, 29 shapes", "2 series, 1461 values", or the message.
+std::string Summary(const MapContent& content);
+std::string Summary(const SeriesContent& content);
+
+}  // namespace tervane

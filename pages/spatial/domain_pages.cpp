@@ -1,0 +1,127 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/spatial/domain_pages.h"
+
+#include "pages/spatial/create_dialogs.h"
+#include "pages/spatial/plot_content.h"
+#include "platform/cart.h"
+#include "platform/units.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr int kHorizontalLength = 100217;
+
+}  // namespace
+
+Control& CCatchmentDlg::GridNumber(PageForm& form, const std::string& label, double& own,
+                                   double GridGeometry::*inFile) {
+  CCatchmentKvf& n = Node();
+  Control& control = form.Number(label, own);
+  control.text = [&n, &control, inFile] { return ShownNumber(n.GetModelGeometry().*inFile, control.NumberUnit()); };
+  control.EnabledWhen([&n] { return n.Type == CCatchmentKvf::kShapeFile; });
+  return control.RevalidatesLater();
+}
+
+bool CCatchmentDlg::BrowseShape(Host& host, const Host::FileQuestion& asked) {
+  CCatchmentKvf& n = Node();
+  const std::string folder = n.GetRoot() ? n.GetRoot()->SetupFolder() : std::string();
+  Host::FileQuestion question = asked;
+  question.current = n.ShapeFile().File.IsEmpty() ? folder : n.ShapeFile().File.Absolute();
+  const auto path = host.AskFileToOpen(question);
+  if (!path) return false;
+  const auto& units = FindItemType(kCoordinateItemType)->unitKeys;
+  Host::ItemQuestion axis;
+  axis.title = "Shape axis units";
+  axis.file = *path;
+  axis.heads = {"Unit of the coordinates"};
+  for (const int unit : units) {
+    if (unit == n.ShapeAxisUnit) axis.current = static_cast<int>(axis.rows.size());
+    axis.rows.push_back({{std::string(FindUnit(unit)->text)}, {}});
+  }
+  const auto chosen = host.AskItem(axis);
+  if (!chosen) return false;
+  std::string problem;
+  if (!n.ChooseShapeFile(FileName::Picked(*path, folder), units[static_cast<std::size_t>(*chosen)], problem))
+    host.Tell("Can not load shape file\n\n" + problem, Host::Icon::Error);
+  return true;
+}
+
+void CCatchmentDlg::Describe(PageForm& form) {
+  CCatchmentKvf& n = Node();
+  const auto fromGrid = [&n] { return n.Type == CCatchmentKvf::kGridFile; };
+  const auto fromShape = [&n] { return n.Type == CCatchmentKvf::kShapeFile; };
+  form.Radio("", n.Type, {"Catchment defined by Nds File", "Catchment defined by Shape File"}).RevalidatesLater();
+  form.DataFile("Filename:", n.GridFile())
+      .Filter(kGridFileFilter)
+      .DefaultExtension("nds2")
+      .ShownWhen(fromGrid)
+      .RevalidatesLater();
+  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(fromGrid);
+  form.Button("Create...",
+              [this] {
+                if (!MayCreateFile(Context())) return;
+                CData2DNdsCreateDlg dialog(Context(), Node());
+                if (const auto file = dialog.Run()) {
+                  Node().GridFile().Choose(*file);
+                  Node().SetRevalidateAll();
+                  UpdateDoc(kDataChanged, "Create Grid File");
+                }
+              })
+      .Beside()
+      .ShownWhen(fromGrid);
+  Control& shape = form.ShapeFile("Filename:", n.ShapeFile());
+  shape.Filter(kShapeFileFilter).DefaultExtension("shp").ShownWhen(fromShape).RevalidatesLater();
+  shape.browse = [this, &shape](Host& host) { return BrowseShape(host, shape.fileQuestion); };
+
+  PageForm& grid = form.Group("Grid");
+  const auto cells = [&](const char* label, const char* key, int& own, int GridGeometry::*inFile) {
+    grid.Integer(
+            label, [&n, inFile] { return n.GetModelGeometry().*inFile; }, [&own](int value) { own = value; })
+        .Key(key)
+        .EnabledWhen(fromShape)
+        .RevalidatesLater();
+  };
+  cells("NX:", "nxShp", n.nxShp, &GridGeometry::nx);
+  cells("NY:", "nyShp", n.nyShp, &GridGeometry::ny);
+  GridNumber(grid, "Cell Size:", n.sizeShp, &GridGeometry::cellSize).Quantity(kHorizontalLength);
+  GridNumber(grid, "X0:", n.x0Shp, &GridGeometry::x0).Quantity(kHorizontalLength);
+  GridNumber(grid, "Y0:", n.y0Shp, &GridGeometry::y0).Quantity(kHorizontalLength);
+  GridNumber(grid, "Rotation:", n.rotationShp, &GridGeometry::rotation).Unit("[Deg, Counter clockwise]");
+  grid.Text(
+          "Map Projection Type:", [&n] { return n.GetModelGeometry().projection; },
+          [&n](const std::string& text) { n.MapProjShp = text; })
+      .Key("MapProjShp")
+      .EnabledWhen(fromShape)
+      .RevalidatesLater();
+  grid.Shown("", [&n] { return CYbMapProjection(n.GetModelGeometry().projection).Name(); });
+
+  form.Map([this] { return Map(); });
+}
+
+MapContent CCatchmentDlg::Map() {
+  const CCatchmentKvf& n = Node();
+  if (n.Type == CCatchmentKvf::kGridFile) {
+    MapContent map = FileMap(n.GridFile());
+    if (!map.grids.empty()) {
+      map.grids.front().isCodes = true;
+      map.grids.front().withLegend = false;
+    }
+    return map;
+  }
+  if (n.ShapeFile().File.IsEmpty()) return GridMap(n, nullptr, "No file is chosen.");
+  const std::string file = n.ShapeFile().File.Absolute();
+  Made made{n.GetModelGeometry(), file, StampOf(file), n.ShapeAxisUnit};
+  if (!made_ || !(*made_ == made)) {
+    grid_ = n.GetDomainFromShape(&problem_);
+    shapes_ = n.GetDomainShape();
+    made_ = std::move(made);
+  }
+  MapContent map = GridMap(n, grid_, problem_);
+  if (!map.grids.empty()) map.grids.front().isCodes = true;
+  if (shapes_) map.shapes.push_back({shapes_, {}});
+  return map;
+}
+
+}  // namespace tervane

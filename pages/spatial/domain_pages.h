@@ -1,0 +1,39 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include "pages/page.h"
+#include "pages/plots.h"
+#include "spatial/domain.h"
+
+namespace tervane {
+
+/// The model domain and its grid.
+class CCatchmentDlg : public PageOf<CCatchmentKvf> {
+ public:
+  using PageOf::PageOf;
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  /// A number of the grid: the file's, or the node's own, which can be changed.
+  Control& GridNumber(PageForm& form, const std::string& label, double& own, double GridGeometry::*inFile);
+  bool BrowseShape(Host& host, const Host::FileQuestion& question);
+  MapContent Map();
+
+  /// The domain that was made last, and what it was made of.
+  struct Made {
+    GridGeometry geometry;
+    std::string file;
+    FileStamp stamp;
+    int axisUnit = 0;
+    bool operator==(const Made&) const = default;
+  };
+  std::optional<Made> made_;
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid_;
+  std::shared_ptr<const CYbShapeData> shapes_;
+  std::string problem_;
+};
+
+}  // namespace tervane

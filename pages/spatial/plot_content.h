@@ -1,0 +1,43 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What the pages of spatial and temporal input have in common: their maps, charts and buttons.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "pages/page.h"
+#include "pages/plots.h"
+#include "spatial/file_nodes.h"
+#include "spatial/zone_sync.h"
+
+namespace tervane {
+
+/// A map of one grid, or the reason why there is none; on the setup's backdrop and with its transparency.
+MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid,
+                   const std::string& problem);
+/// The same of the first step of a data file's selected item.
+MapContent FileMap(const DataFileNode& file);
+/// A map of a shape file with its attribute.
+MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit);
+/// A chart of the selected item of a file of series, with the simulation's period.
+SeriesContent FileChart(const DataFileNode& file);
+
+/// The units of an item type as a choice list over the key that a setup stores.
+Control& UnitKeyChoice(PageForm& form, const std::string& label, const char* key, int& unitKey, int itemType);
+
+/// Brings zones or stations in step with a source, asking before work of the user's would be lost. Gives the hints of
+/// what changed; `sync` does it.
+int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const std::function<SyncResult()>& sync);
+
+/// Opens a data file of a page in the program's viewer, with the backdrop prepared for it.
+void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const FileName& file);
+/// True when the setup has a name, beside which files can be made; else the user is told so.
+bool MayCreateFile(const PageContext& context);
+
+inline constexpr const char* kGridFileFilter = "Two Dim Files (*.nds2) |*.nds2|All Files (*.*) |*.*||";
+inline constexpr const char* kShapeFileFilter = "Shape Files (*.shp) |*.shp|All Files (*.*) |*.*||";
+inline constexpr const char* kSeriesFileFilter = "Time series files (*.nds0) |*.nds0|All Files (*.*) |*.*||";
+
+}  // namespace tervane

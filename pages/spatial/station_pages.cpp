@@ -1,0 +1,192 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/spatial/station_pages.h"
+
+#include <algorithm>
+
+#include "pages/spatial/create_dialogs.h"
+#include "pages/spatial/plot_content.h"
+#include "platform/units.h"
+
+namespace tervane {
+
+namespace {
+
+/// A value or a series, as a uniform forcing, a station and a time constant have it.
+struct ValueOrSeries {
+  int& type;  ///< 0 constant, 1 series.
+  float& value;
+  CFMData0DFile& file;
+  std::vector<int> itemTypes, valueTypes;
+};
+
+/// The controls of a value or a series; `isShown` says whether this form of the data is in force.
+void DescribeValueOrSeries(PageForm& form, CYbSEDlgBase& page, const PageContext& context, ValueOrSeries data,
+                           const std::function<bool()>& isShown) {
+  const auto isConstant = [isShown, &type = data.type] { return isShown() && type == 0; };
+  const auto isSeries = [isShown, &type = data.type] { return isShown() && type == 1; };
+  form.Number("Value:", data.value).Quantity(data.itemTypes.front()).ShownWhen(isConstant);
+  CFMData0DFile& file = data.file;
+  form.DataFile("Time Series File:", file).Filter(kSeriesFileFilter).DefaultExtension("nds0").ShownWhen(isSeries);
+  form.Button("Edit...",
+              [&file, context] {
+                if (context.openDataFile) context.openDataFile(file.File.Absolute());
+              })
+      .ShownWhen(isSeries);
+  form.Button("Create...",
+              [&page, context, &file, &value = data.value, items = data.itemTypes, kinds = data.valueTypes] {
+                if (!MayCreateFile(context)) return;
+                CTvnCreate0DNdsDlg dialog(context, page.Node(), value, items, kinds);
+                if (const auto made = dialog.Run()) {
+                  file.Choose(*made);
+                  page.UpdateDoc(kDataChanged, "Create Time Series File");
+                }
+              })
+      .Beside()
+      .ShownWhen(isSeries);
+  form.Chart([&file] { return FileChart(file); }).ShownWhen(isSeries);
+}
+
+/// The map of the areas of a forcing's stations, one of them standing out.
+MapContent StationMap(const C2DStationBasedDataKvf& data, const CFMSEKvfGroupBase* highlighted) {
+  if (data.UsesPolygons()) {
+    MapContent map = ShapeFileMap(data.Stations().ShapeFile(), data.Stations().ShapeAxisUnit);
+    if (highlighted && !map.shapes.empty()) map.shapes.front().highlighted = highlighted->GetStationId();
+    return map;
+  }
+  const bool isDistributed = data.DistributionType == C2DStationBasedDataKvf::kFullyDistributed;
+  MapContent map = isDistributed ? FileMap(data.FullyDistributed().GridFile()) : FileMap(data.Stations().GridFile());
+  if (!map.grids.empty() && !isDistributed) {
+    map.grids.front().isCodes = true;
+    if (highlighted) map.grids.front().highlighted = static_cast<float>(highlighted->StationCode());
+  }
+  return map;
+}
+
+const std::vector<std::string> kTemporal{"Constant", "Time varying (.nds0)"};
+
+}  // namespace
+
+int C2DStationBasedDataDlg::Sync() {
+  C2DStationBasedDataKvf& n = Node();
+  const FoundZones found = n.FindStations();
+  const int hint = SyncOrAsk(Outside(), found, n.PlanStations(found), [&] { return n.SyncStations(found); });
+  const std::vector<std::string> names = n.GetStationNames();
+  std::string& filler = n.Stations().ShapeGapFillName;
+  if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
+  return hint;
+}
+
+void C2DStationBasedDataDlg::OnRefresh() {
+  if (Node().DistributionType == C2DStationBasedDataKvf::kStationBased)
+    UpdateDoc(Sync() | kRefreshPlots, "Refresh Stations");
+}
+
+void C2DStationBasedDataDlg::Describe(PageForm& form) {
+  using Node_ = C2DStationBasedDataKvf;
+  Node_& n = Node();
+  const auto is = [&n](int distribution) { return [&n, distribution] { return n.DistributionType == distribution; }; };
+  const auto byCodes = [&n] { return n.UsesGridCodes(); };
+  const auto byPolygons = [&n] { return n.UsesPolygons(); };
+  const auto sync = [this] { return Sync(); };
+  form.Choice("Spatial Distribution:", n.DistributionType, {"Uniform", "Station based", "Fully distributed"})
+      .RevalidatesLater();
+  form.Choice("Temporal Distribution:", n.Global().TYPE, kTemporal).Key("TYPE").ShownWhen(is(Node_::kUniform));
+  form.Choice("Data Type:", n.Stations().TYPE, {"Grid codes (.nds2)", "Polygons (.shp)"})
+      .ShownWhen(is(Node_::kStationBased))
+      .Then(sync);
+  DescribeValueOrSeries(
+      form, *this, Context(),
+      {n.Global().TYPE, n.Global().FIXED_VALUE, n.Global().SeriesFile(), n.Kind().itemTypes, n.Kind().valueTypes},
+      is(Node_::kUniform));
+
+  form.DataFile("Station Based Distribution File:", n.Stations().GridFile())
+      .Filter("Station distr.files (*.nds2) |*.nds2|All Files (*.*) |*.*||")
+      .DefaultExtension("nds2")
+      .ShownWhen(byCodes)
+      .Then(sync);
+  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().Stations().GridFile().File); })
+      .ShownWhen(byCodes);
+  form.Button("Create...",
+              [this] {
+                if (!MayCreateFile(Context())) return;
+                CData2DNdsCreateDlg dialog(Context(), 1.0F, Node(), kCodeItemType);
+                if (const auto file = dialog.Run()) {
+                  Node().Stations().GridFile().Choose(*file);
+                  UpdateDoc(Sync(), "Create Grid File");
+                }
+              })
+      .Beside()
+      .ShownWhen(byCodes);
+  form.ShapeFile("Shape File:", n.Stations().ShapeFile())
+      .Filter(kShapeFileFilter)
+      .DefaultExtension("shp")
+      .ShownWhen(byPolygons)
+      .Then(sync);
+  form.Shown("Item Name:", [&n] { return n.Stations().ShapeFile().Attribute(); }).ShownWhen(byPolygons);
+  UnitKeyChoice(form, "Unit of X- and Y-axes", "ShapeAxisUnit", n.Stations().ShapeAxisUnit, kCoordinateItemType)
+      .ShownWhen(byPolygons);
+  form.Choice(
+          "Fill Gaps with:",
+          [&n] {
+            const std::vector<std::string> names = n.GetStationNames();
+            const auto found = std::ranges::find(names, n.Stations().ShapeGapFillName);
+            return found == names.end() ? -1 : static_cast<int>(found - names.begin());
+          },
+          [&n](int choice) {
+            const std::vector<std::string> names = n.GetStationNames();
+            if (choice >= 0 && choice < static_cast<int>(names.size()))
+              n.Stations().ShapeGapFillName = names[static_cast<std::size_t>(choice)];
+          },
+          [&n] { return n.GetStationNames(); })
+      .Key("ShapeGapFillName")
+      .ShownWhen(byPolygons);
+  form.DataFile("Fully Distribution File:", n.FullyDistributed().GridFile())
+      .Filter(kGridFileFilter)
+      .DefaultExtension("nds2")
+      .ShownWhen(is(Node_::kFullyDistributed));
+  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().FullyDistributed().GridFile().File); })
+      .ShownWhen(is(Node_::kFullyDistributed));
+  form.Map([this] {
+        MapContent map = StationMap(Node(), nullptr);
+        map.picked = [this](const MapPick& pick) {
+          const CYbSEKvfBase* station = nullptr;
+          if (Node().UsesGridCodes() && pick.value) station = Node().SelectStationByCode(static_cast<int>(*pick.value));
+          if (Node().UsesPolygons() && pick.shape) {
+            const auto shapes = ShapeFileMap(Node().Stations().ShapeFile(), Node().Stations().ShapeAxisUnit).shapes;
+            station = Node().SelectStationByName(TextOf(shapes.front().shapes->GetData()[*pick.shape].Value()));
+          }
+          if (station && Context().selectNode) Context().selectNode(*station);
+        };
+        return map;
+      })
+      .ShownWhen([&n] { return n.DistributionType != Node_::kUniform; });
+}
+
+void C2DStationBaseDataTimeSeriesDlg::Describe(PageForm& form) {
+  C2DStationBasedDataTimeSeriesKvf& n = Node();
+  const auto* data = dynamic_cast<const C2DStationBasedDataKvf*>(n.GetParent());
+  form.Text("Station ID:", n.NAME).Hint(kTreeRebuilt | kDataChanged).Then([&n] {
+    return n.SetAbbreviatedTitle(n.NAME), 0;
+  });
+  form.Choice("Temporal Distribution:", n.TYPE, kTemporal);
+  form.Shown("Grid code value:", [&n] { return n.GRIDCODEID; }).ShownWhen([data] {
+    return data && data->UsesGridCodes();
+  });
+  form.Shown("Polygon:", [&n] { return n.GRIDCODEID; }).ShownWhen([data] { return data && data->UsesPolygons(); });
+  if (!data) return;
+  DescribeValueOrSeries(form, *this, Context(),
+                        {n.TYPE, n.FIXED_VALUE, n.SeriesFile(), data->Kind().itemTypes, data->Kind().valueTypes},
+                        [] { return true; });
+  form.Map([&n, data] { return StationMap(*data, &n); });
+}
+
+void CTimeseriesConstDlg::Describe(PageForm& form) {
+  CTimeseriesConstKvf& n = Node();
+  form.Choice("Temporal Distribution:", n.Global().TYPE, kTemporal).Key("TYPE");
+  DescribeValueOrSeries(form, *this, Context(),
+                        {n.Global().TYPE, n.Global().FIXED_VALUE, n.Global().SeriesFile(), {n.GetItemType()}, {3}},
+                        [] { return true; });
+}
+
+}  // namespace tervane

@@ -1,0 +1,33 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Grids in data files.
+#pragma once
+
+#include <string>
+
+#include "platform/grid.h"
+#include "platform/shapes.h"
+
+namespace tervane {
+
+/// Reads the first time step of an item of a grid file, in the base unit of its item type.
+FileResult ReadGridData(const std::string& path, int item, CTvn2DOrthoRotatedGridData& grid);
+/// Writes a grid as a data file with one item and no time axis, in place of a file of that name.
+FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridData& grid);
+/// Where the grid of an item stands, without its values.
+FileResult ReadGeoInfoFromNdsFile(const std::string& path, int item, GridGeometry& geometry);
+/// The name of an item; empty when there is none.
+std::string ItemNameOf(const std::string& path, int item);
+
+/// What a file of a model domain looks like, by its first item.
+enum class DomainFileState { Unreadable, NoItem, BadItem, NoStatistics, Read };
+struct DomainFileFacts {
+  double smallest = 0, largest = 0;
+};
+DomainFileState ReadDomainFacts(const std::string& path, DomainFileFacts& facts);
+
+/// The points of a text file as shapes whose value is their z.
+FileResult ReadXyzShapes(const std::string& path, int axisUnit, CTvnShapeData& shapes);
+
+}  // namespace tervane

@@ -1,0 +1,28 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/map_view.h"
+
+#include "shell/map_canvas.h"
+
+namespace tervane {
+
+MapView::MapView(Host& host, QWidget* parent) : PlotFrame(host, parent), canvas_(new MapCanvas) {
+  connect(canvas_, &MapCanvas::PointedAt, this,
+          [this](const QString& text) { SetStatus(text.isEmpty() ? canvas_->Summary() : text); });
+  Hold({canvas_, [this](double factor) { canvas_->Zoom(factor); }, [this] { canvas_->Fit(); },
+        [this](double pixelRatio) { return canvas_->Picture(pixelRatio); }});
+}
+
+void MapView::Show(MapContent content, const DisplayUnits* units) {
+  const DisplayUnits chosen = units ? *units : DisplayUnits();
+  if (isShown_ && chosen == units_ && LooksSame(content, canvas_->Content())) {
+    canvas_->SetPicked(std::move(content.picked));
+    return;
+  }
+  isShown_ = true;
+  units_ = chosen;
+  canvas_->SetContent(std::move(content), units);
+  SetStatus(canvas_->Summary());
+}
+
+}  // namespace tervane

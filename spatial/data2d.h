@@ -1,0 +1,147 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Quantities that have one value for each cell of the model: a uniform value, a grid file, a shape file, or a text file
+// of points.
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "platform/grid.h"
+#include "platform/grid_interpolation.h"
+#include "spatial/file_nodes.h"
+
+namespace tervane {
+
+/// What makes one quantity of this kind differ from the next.
+struct Data2DKind {
+  std::string section;
+  std::string title;
+  int itemType;          ///< `kCodeItemType` for codes, `kUndefinedItemType` for none.
+  float fixedValue = 0;  ///< The default.
+  enum class RelativeToGround { Never, Off, On } relativeToGround = RelativeToGround::Never;  ///< On, Off: the default.
+  bool mayBeScattered = true;  ///< Whether shape and XYZ files are offered.
+};
+
+/// All that decides what grid a quantity has; grids of equal sources are equal.
+struct GridSource {
+  int type = 0;
+  std::string file;
+  FileStamp stamp;
+  int item = 1;
+  std::string attribute;
+  int interpMethod = 0;
+  float searchRadius = 0;
+  int axisUnit = 0, itemUnit = 0, itemType = 0;
+  GridGeometry geometry;
+
+  bool operator==(const GridSource&) const = default;
+};
+
+/// Makes the grid of a source; it asks no node, so that another thread may do it. `grid` stays as it was on failure.
+FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work, CTvn2DOrthoRotatedGridData& grid);
+
+class CData2DKvf : public CTvnKvfBase {
+ public:
+  CData2DKvf(Data2DKind kind, CYbSEKvfBase* parent);
+
+  enum Source : int { kUniform = 0, kGridFile = 1, kShapeFile = 2, kXyzFile = 3 };
+
+  int Type = kUniform;
+  float FixedValue;      ///< For a code item a whole number.
+  int InterpMethod = 2;  ///< 0 bilinear, 1 triangular, 2 inverse distance, 3 inverse distance squared.
+  float SearchRadius = 1000;
+  int ShowGridData = 1;
+  int ShowShapeData = 1;
+  int ShapeAxisUnit;         ///< Of the coordinates of shape and XYZ files, a unit key.
+  int ShapeItemUnit;         ///< Of their values.
+  int RelativeToGround = 0;  ///< The values are depths below ground; only where the kind has the option.
+
+  const Data2DKind& Kind() const { return kind_; }
+  bool HasRelativeToGround() const { return kind_.relativeToGround != Data2DKind::RelativeToGround::Never; }
+  bool IsCode() const { return kind_.itemType == kCodeItemType; }
+  bool IsInterpolated() const { return !IsCode(); }
+  /// The item type of the values as they are: heights above ground where they are relative to it.
+  virtual int GetItemType() const;
+
+  CTvnData2DNdsFile& GridFile() const { return *gridFile_; }
+  CData2DShpFile& ShapeFile() const { return *shapeFile_; }
+  CData2DXyzFile& XyzFile() const { return *xyzFile_; }
+
+  /// The name of the selected item of the grid file; empty when it cannot be read.
+  std::string GetNdsItemName() const;
+
+  /// What decides the grid now.
+  GridSource CurrentSource() const;
+  /// The grid, built when what decides it has changed since it was built last; null for a uniform value and where it
+  /// cannot be built, and then `problem` says why.
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> GetGridData(std::string* problem = nullptr);
+  /// A new grid; the one that is kept is left alone.
+  std::shared_ptr<CTvn2DOrthoRotatedGridData> CreateGridData(std::string* problem = nullptr) const;
+  /// Shapes or points as they are in their file, kept likewise; null for other sources.
+  std::shared_ptr<const CYbShapeData> GetShapeData(std::string* problem = nullptr);
+  /// With 0 the next call builds anew.
+  void SetGridDataValid(int valid);
+  void SetShapeDataValid(int valid);
+
+  int ValidateData() override;
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  Data2DKind kind_;
+  CTvnData2DNdsFile* gridFile_;
+  CData2DShpFile* shapeFile_;
+  CData2DXyzFile* xyzFile_;
+
+  struct Kept {
+    GridSource source;
+    std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid;
+    std::string problem;
+  };
+  std::optional<Kept> kept_;
+  struct KeptShapes {
+    GridSource source;
+    std::shared_ptr<const CYbShapeData> shapes;
+    std::string problem;
+  };
+  std::optional<KeptShapes> keptShapes_;
+};
+
+/// The ground surface.
+class CTopographyKvf : public CData2DKvf {
+ public:
+  explicit CTopographyKvf(CYbSEKvfBase* parent) : CData2DKvf({"Topography", "Topography", 100180, 10.0F}, parent) {}
+  int IsDlgUsedInSetup() override;
+};
+
+// What stands in for a process that is not modelled.
+
+class CDummyEvapoTransKvf : public CData2DKvf {
+ public:
+  explicit CDummyEvapoTransKvf(CYbSEKvfBase* parent)
+      : CData2DKvf({"NetRainfallFraction", "Net Rainfall Fraction", 100239, 1.0F}, parent) {}
+  int IsDlgUsedInSetup() override;
+};
+
+class CDummySatZoneKvf : public CData2DKvf {
+ public:
+  explicit CDummySatZoneKvf(CYbSEKvfBase* parent)
+      : CData2DKvf({"GroundwaterTable", "Groundwater table for lower UZ boundary", 100180, -0.9F,
+                    Data2DKind::RelativeToGround::On},
+                   parent) {}
+  int IsDlgUsedInSetup() override;
+};
+
+class CDummyUnSatZoneKvf : public CData2DKvf {
+ public:
+  explicit CDummyUnSatZoneKvf(CYbSEKvfBase* parent)
+      : CData2DKvf({"InfiltrationFraction", "Infiltration Fraction", 100239, 1.0F}, parent) {}
+  int IsDlgUsedInSetup() override;
+};
+
+}  // namespace tervane

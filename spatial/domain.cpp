@@ -1,0 +1,126 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "spatial/domain.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include <fmt/format.h>
+
+#include "platform/cart.h"
+#include "platform/grid_files.h"
+#include "platform/units.h"
+#include "spatial/pages.h"
+
+namespace tervane {
+
+CCatchmentKvf::CCatchmentKvf(CYbSEKvfBase* parent)
+    : CTvnKvfBase("Model Domain and Grid", "Catchment", parent),
+      MapProjShp(CYbMapProjection::IDtoProjectionString(1)),
+      ShapeAxisUnit(BaseUnit(*FindItemType(kCoordinateItemType)).key),
+      gridFile_(NewChild<CTvnData2DNdsFile>(kCodeItemType)),
+      shapeFile_(NewChild<CData2DShpFile>()) {
+  SetPage(kCatchmentPage);
+  shapeFile_->SetPolygonShape(1);
+  shapeFile_->SetValidateFlag(0);
+}
+
+void CCatchmentKvf::ExchangeKeys(KeyExchange& keys) {
+  keys.FromOne("type", Type);
+  keys("nxShp", nxShp);
+  keys("nyShp", nyShp);
+  keys("sizeShp", sizeShp);
+  keys("x0Shp", x0Shp);
+  keys("y0Shp", y0Shp);
+  keys("MapProjShp", MapProjShp);
+  keys("rotationShp", rotationShp);
+  keys("ShapeAxisUnit", ShapeAxisUnit);
+}
+
+GridGeometry CCatchmentKvf::GetModelGeometry() const {
+  if (Type == kShapeFile) return {nxShp, nyShp, sizeShp, x0Shp, y0Shp, rotationShp, MapProjShp};
+  GridGeometry geometry;
+  if (ReadGeoInfoFromNdsFile(gridFile_->File.Absolute(), gridFile_->SelectedItem(), geometry).Ok()) return geometry;
+  return {50, 50, 1000.0, 0.0, 0.0, 0.0, CYbMapProjection::IDtoProjectionString(1)};
+}
+
+std::shared_ptr<CTvn2DOrthoRotatedGridData> CCatchmentKvf::GetDomainGrid(std::string* problem) const {
+  if (Type == kShapeFile) return GetDomainFromShape(problem);
+  auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
+  const FileResult result = ReadGridData(gridFile_->File.Absolute(), gridFile_->SelectedItem(), *grid);
+  if (problem) *problem = result.error;
+  return result.Ok() ? grid : nullptr;
+}
+
+std::shared_ptr<CTvn2DOrthoRotatedGridData> CCatchmentKvf::GetDomainFromShape(std::string* problem) const {
+  auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
+  const FileResult result = grid->MakeCatchmentGriddataFromShapefile(
+      shapeFile_->File.Absolute(), ShapeAxisUnit, {nxShp, nyShp, sizeShp, x0Shp, y0Shp, rotationShp, MapProjShp});
+  if (problem) *problem = result.error;
+  return result.Ok() ? grid : nullptr;
+}
+
+std::shared_ptr<const CYbShapeData> CCatchmentKvf::GetDomainShape(std::string* problem) const {
+  auto shapes = std::make_shared<CTvnShapeData>();
+  shapes->SetAxisLengthUnit(ShapeAxisUnit);
+  const FileResult result = shapes->ReadShapeFile(shapeFile_->File.Absolute());
+  if (problem) *problem = result.error;
+  return result.Ok() ? shapes : nullptr;
+}
+
+bool CCatchmentKvf::ChooseShapeFile(FileName file, int axisUnit, std::string& problem) {
+  shapeFile_->Choose(std::move(file), {});
+  ShapeAxisUnit = axisUnit;
+  CTvnShapeData shapes;
+  shapes.SetAxisLengthUnit(axisUnit);
+  const FileResult result = shapes.ReadShapeFile(shapeFile_->File.Absolute());
+  Envelope box;
+  if (!result.Ok() || !shapes.GetTranscribingRect(box)) {
+    problem = result.Ok() ? "it holds no shapes" : result.error;
+    return false;
+  }
+  x0Shp = box.xMin;
+  y0Shp = box.yMin;
+  if (nxShp >= 2 && nyShp >= 2)
+    sizeShp = std::max(
+        {std::trunc((box.xMax - box.xMin) / (nxShp - 1)), std::trunc((box.yMax - box.yMin) / (nyShp - 1)), 1.0});
+  return true;
+}
+
+int CCatchmentKvf::ValidateData() {
+  gridFile_->SetFileUsed(Type == kGridFile);
+  shapeFile_->SetValidateFlag(Type == kShapeFile);
+  if (Type == kGridFile) {
+    DomainFileFacts facts;
+    switch (ReadDomainFacts(gridFile_->File.Absolute(), facts)) {
+      case DomainFileState::Unreadable:  // the file's own node tells
+        return 0;
+      case DomainFileState::NoItem:
+        return 1;
+      case DomainFileState::BadItem:
+        AddError("Error reading nds2 item. File must have one and only one item.", "FILE_NAME");
+        return 0;
+      case DomainFileState::NoStatistics:
+        AddError("Error reading nds2 file.", "FILE_NAME");
+        return 0;
+      case DomainFileState::Read:
+        break;
+    }
+    if (facts.smallest < 1.0 || facts.largest > 2.0) {
+      AddError(
+          "Error in nds2 file. Only 3 type of values is allowed. Delete values (typical = -1e-35), 1 = internal cell "
+          "and 2 = outer boundary cell.",
+          "FILE_NAME", fmt::format("its values are between {} and {}", facts.smallest, facts.largest));
+      return 0;
+    }
+  }
+  if (auto* maps = dynamic_cast<DomainFollower*>(ImportantNode("OVERLAY_DATA"))) maps->AdoptDomain(GetEnvelope());
+  const std::string projection = GetModelGeometry().projection;
+  if (CYbMapProjection(projection).IsGeographical()) {
+    AddError(projection + " is not supported by Tervane. Only projected coordinate systems are allowed", "MapProjShp");
+    return 0;
+  }
+  return 1;
+}
+
+}  // namespace tervane

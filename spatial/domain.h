@@ -1,0 +1,65 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include "platform/grid.h"
+#include "platform/shapes.h"
+#include "spatial/file_nodes.h"
+
+namespace tervane {
+
+/// What must follow when the model's domain is another one: the maps that show it.
+class DomainFollower {
+ public:
+  virtual ~DomainFollower() = default;
+  virtual void AdoptDomain(const Envelope& domain) = 0;
+};
+
+/// The model domain and its grid: a grid file, or the polygons of a shape file on a grid that is given here. A cell of
+/// the domain is empty outside, 1 inside, 2 at the outer boundary.
+class CCatchmentKvf : public CTvnKvfBase {
+ public:
+  explicit CCatchmentKvf(CYbSEKvfBase* parent);
+
+  enum Source : int { kGridFile = 0, kShapeFile = 1 };
+
+  int Type = kGridFile;
+  // With the shape source; the lower left corner is the origin.
+  int nxShp = 200, nyShp = 200;
+  double sizeShp = 1000.0;  ///< In metres.
+  double x0Shp = 0.0, y0Shp = 0.0;
+  std::string MapProjShp;
+  double rotationShp = 0.0;  ///< Degrees, counter-clockwise.
+  int ShapeAxisUnit;         ///< Of the shape file's coordinates, a unit key of item 100187.
+
+  CTvnData2DNdsFile& GridFile() const { return *gridFile_; }
+  CData2DShpFile& ShapeFile() const { return *shapeFile_; }
+
+  /// The grid on which the model works; without a readable file 50 by 50 cells of 1000 m at the origin.
+  GridGeometry GetModelGeometry() const;
+  /// The smallest axis-parallel rectangle around it.
+  Envelope GetEnvelope() const { return EnvelopeOf(GetModelGeometry()); }
+  /// The domain as a grid, built anew; null with the reason in `problem` when that is not possible.
+  std::shared_ptr<CTvn2DOrthoRotatedGridData> GetDomainGrid(std::string* problem = nullptr) const;
+  std::shared_ptr<CTvn2DOrthoRotatedGridData> GetDomainFromShape(std::string* problem = nullptr) const;
+  /// The shape file, for drawing; null when it cannot be read.
+  std::shared_ptr<const CYbShapeData> GetDomainShape(std::string* problem = nullptr) const;
+
+  /// Takes a shape file with the unit of its coordinates, and puts the grid's corner and cell size where it lies.
+  /// False, with the reason, when it cannot be read: the grid's values then stay.
+  bool ChooseShapeFile(FileName file, int axisUnit, std::string& problem);
+
+  int ValidateData() override;
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  CTvnData2DNdsFile* gridFile_;
+  CData2DShpFile* shapeFile_;
+};
+
+}  // namespace tervane

@@ -1,0 +1,85 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "spatial/file_nodes.h"
+
+#include "platform/units.h"
+#include "simspec/periods.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr const char* kNotValid = "File is not valid";
+constexpr const char* kNoFile = "no file is chosen";
+
+}  // namespace
+
+void DataFileNode::SetItemType(int itemType) {
+  ItemTypes.clear();
+  if (itemType != 0 && itemType != kUndefinedItemType) ItemTypes.push_back(itemType);
+}
+
+DataFileRequest DataFileNode::SetUpNdsValidation() const {
+  DataFileRequest request;
+  request.itemTypes = ItemTypes;
+  request.dimensions = dimensions_;
+  return request;
+}
+
+DataFileRequest DataFileNode::WithSimulationPeriod(DataFileRequest request) const {
+  if (const auto* period = Important<CSimPeriodKvf>("SIMPERIOD"))
+    request.period = {period->GetSimStartDate(), period->SIMEND};
+  return request;
+}
+
+int DataFileNode::ValidateData() {
+  if (FileUsed == 0) return 1;
+  if (File.IsEmpty()) {
+    AddError(kNotValid, "FILE_NAME", kNoFile);
+    return 0;
+  }
+  const std::string path = File.Absolute();
+  const DataFileRequest request = SetUpNdsValidation();
+  if (const std::string reason = WhyNotMet(path, Items, request); !reason.empty()) {
+    AddError(kNotValid, "FILE_NAME", reason);
+    return 0;
+  }
+  if (ChecksPeriod())
+    if (const std::string reason = WhyNotMet(path, Items, WithSimulationPeriod(request)); !reason.empty())
+      AddWarning("The file does not cover the simulation", "FILE_NAME", reason);
+  return 1;
+}
+
+CTvnData2DNdsFile::CTvnData2DNdsFile(int itemType, CYbSEKvfBase* parent)
+    : DataFileNode("Grid file", "NDS_2D_DATA_FILE", 2, parent) {
+  SetItemType(itemType);
+}
+
+DataFileRequest CFMData2DNdsFile::SelectionRequest() const {
+  return PeriodCheck ? WithSimulationPeriod(SetUpNdsValidation()) : SetUpNdsValidation();
+}
+
+DataFileRequest CFMData0DFile::SelectionRequest() const { return WithSimulationPeriod(SetUpNdsValidation()); }
+
+void CData2DShpFile::Choose(FileName file, std::string attribute) {
+  File = std::move(file);
+  Items.clear();
+  if (!attribute.empty()) Items.push_back(std::move(attribute));
+}
+
+int CData2DShpFile::ValidateData() {
+  if (ValidateFlag == 0) return 1;
+  const std::string reason = File.IsEmpty() ? kNoFile : CheckShapeFile(File.Absolute(), request_, Attribute()).error;
+  if (reason.empty()) return 1;
+  AddError(kNotValid, "FILE_NAME", reason);
+  return 0;
+}
+
+void CData2DXyzFile::ExchangeKeys(KeyExchange& keys) {
+  keys.Since(3)("FILE_NAME", File);
+  // A setup written before version 3 holds a plain text.
+  std::string text;
+  if (keys.Until(2, "FILE_NAME", text)) File = FileName(text, GetRoot() ? GetRoot()->SetupFolder() : std::string());
+}
+
+}  // namespace tervane

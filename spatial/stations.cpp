@@ -1,0 +1,193 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "spatial/stations.h"
+
+#include <algorithm>
+
+#include "core/list.h"
+#include "platform/units.h"
+#include "spatial/pages.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr int kPrecipitationRate = 100004;  ///< What a file of any forcing may hold besides its own quantity.
+// Kinds of value: means over a step, and sums over it.
+constexpr int kMeanStepAccumulated = 3, kStepAccumulated = 2;
+
+}  // namespace
+
+// ---- Parts
+
+CGlobalKvf::CGlobalKvf(std::string title, std::string section, std::vector<int> itemTypes, CYbSEKvfBase* parent)
+    : CTvnKvfBase(std::move(title), std::move(section), parent), file_(NewChild<CFMData0DFile>("TIME_SERIES_FILE")) {
+  file_->SetMultiItemTypes(std::move(itemTypes));
+  file_->SetFileUsed(0);
+}
+
+void CGlobalKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("FIXED_VALUE", FIXED_VALUE);
+  keys.FromOne("TYPE", TYPE);
+}
+
+CStationBasedKvf::CStationBasedKvf(CFMSEKvfBase* parent)
+    : CTvnKvfBase("Station Based", "STATION_BASED", parent),
+      ShapeAxisUnit(BaseUnit(*FindItemType(kCoordinateItemType)).key),
+      owner_(*parent),
+      gridFile_(NewChild<CTvnData2DNdsFile>(kCodeItemType)),
+      shapeFile_(NewChild<CData2DShpFile>()) {
+  gridFile_->SetFileUsed(0);
+  shapeFile_->SetValidateFlag(0);
+  shapeFile_->SetPolygonShape(1);
+}
+
+void CStationBasedKvf::ExchangeKeys(KeyExchange& keys) {
+  keys.WriteOnly("NO_TIMESERIES", static_cast<int>(ZoneItems(owner_).size()));
+  keys.FromOne("TYPE", TYPE);
+  keys("ShapeAxisUnit", ShapeAxisUnit);
+  keys("ShapeGapFillName", ShapeGapFillName);
+}
+
+void CStationBasedKvf::ReadData(KvfNode* section) {
+  int count = 0;
+  kvfGetParam(section, "NO_TIMESERIES", &count, 1, 1);
+  if (count < 0 || count > kLargestItemCount) {
+    kvfAddNote(section, "NO_TIMESERIES", count < 0 ? "a negative count is read as 0" : "the count is cut to 1000000");
+    count = std::clamp(count, 0, kLargestItemCount);
+  }
+  // The parent is walking its children, and goes on to read these.
+  for (int number = 1; number <= count; ++number) owner_.AddChild(owner_.CreateStationItem());
+  CTvnKvfBase::ReadData(section);
+}
+
+CFullyDistributedKvf::CFullyDistributedKvf(int itemType, CYbSEKvfBase* parent)
+    : CTvnKvfBase("Fully Distributed", "FULLY_DISTRIBUTED", parent), gridFile_(NewChild<CFMData2DNdsFile>(itemType)) {
+  gridFile_->SetFileUsed(0);
+}
+
+void CFullyDistributedKvf::ReadData(KvfNode* section) {
+  CTvnKvfBase::ReadData(section);
+  gridFile_->PeriodCheck = TYPE == 1;
+}
+
+// ---- Stations
+
+C2DStationBasedDataTimeSeriesKvf::C2DStationBasedDataTimeSeriesKvf(const ForcingKind& kind, CYbSEKvfBase* parent)
+    : CFMSEKvfGroupBase("2D Station Based Data", "TIME_SERIES_%d", parent),
+      file_(NewChild<CFMData0DFile>("TIME_SERIES_FILE")) {
+  SetPage(kStationPage);
+  SetAbbreviatedTitle(NAME);
+  file_->SetMultiItemTypes(kind.itemTypes);
+}
+
+void C2DStationBasedDataTimeSeriesKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("NAME", NAME);
+  keys("GRIDCODEID", GRIDCODEID);
+  keys.WriteOnly("GRIDCODE", StationCode());
+  keys("FIXED_VALUE", FIXED_VALUE);
+  keys.FromOne("TYPE", TYPE);
+}
+
+void C2DStationBasedDataTimeSeriesKvf::ReadData(KvfNode* section) {
+  CFMSEKvfGroupBase::ReadData(section);
+  SetAbbreviatedTitle(NAME);
+  if (GetParent()) SetTitle(GetParent()->GetTitle());
+}
+
+int C2DStationBasedDataTimeSeriesKvf::GetNumberWhatAmI() const {
+  const CYbSEKvfBase* parent = GetParent();
+  if (!parent) return -1;
+  // The other children stand in front of all stations.
+  int others = 0;
+  for (const CYbSEKvfBase* child = parent->GetFirstChild(); child; child = parent->GetNextChild(child)) {
+    if (dynamic_cast<const C2DStationBasedDataTimeSeriesKvf*>(child)) break;
+    ++others;
+  }
+  return parent->GetNumberWhatIs(this) - others;
+}
+
+int C2DStationBasedDataTimeSeriesKvf::IsDlgUsedInSetup() {
+  const auto* owner = dynamic_cast<const C2DStationBasedDataKvf*>(GetParent());
+  return !owner || owner->DistributionType == C2DStationBasedDataKvf::kStationBased;
+}
+
+int C2DStationBasedDataTimeSeriesKvf::ValidateData() {
+  file_->SetFileUsed(TYPE == kTimeVarying);
+  return 1;
+}
+
+// ---- The forcing
+
+C2DStationBasedDataKvf::C2DStationBasedDataKvf(int itemType, std::string title, std::string section,
+                                               CYbSEKvfBase* parent)
+    : CFMSEKvfBase(std::move(title), std::move(section), parent),
+      kind_{{itemType, kPrecipitationRate}, {kMeanStepAccumulated, kStepAccumulated}},
+      global_(NewChild<CGlobalKvf>("Global", "GLOBAL", kind_.itemTypes)) {
+  auto stations = std::make_shared<CStationBasedKvf>(this);
+  stations_ = stations.get();
+  AddChild(std::move(stations));
+  fully_ = NewChild<CFullyDistributedKvf>(itemType);
+  SetPage(kStationBasedDataPage);
+  ValidateData();
+}
+
+std::shared_ptr<CFMSEKvfGroupBase> C2DStationBasedDataKvf::CreateStationItem() {
+  auto station = std::make_shared<C2DStationBasedDataTimeSeriesKvf>(kind_, this);
+  station->SetTitle(GetTitle());
+  return station;
+}
+
+FoundZones C2DStationBasedDataKvf::FindStations() const {
+  if (UsesPolygons())
+    return FindPolygonValues(stations_->ShapeFile().File.Absolute(), stations_->ShapeFile().Attribute(),
+                             stations_->ShapeAxisUnit);
+  if (UsesGridCodes())
+    return FindGridCodes(stations_->GridFile().File.Absolute(), stations_->GridFile().SelectedItem());
+  return {};
+}
+
+SyncResult C2DStationBasedDataKvf::SyncStations(const FoundZones& found) {
+  const SyncResult result = SyncItems(*this, found);
+  const bool isWithoutFile = (UsesPolygons() && stations_->ShapeFile().File.IsEmpty()) ||
+                             (UsesGridCodes() && stations_->GridFile().File.IsEmpty());
+  return isWithoutFile ? kRemoved : result;
+}
+
+CFMSEKvfGroupBase* C2DStationBasedDataKvf::SelectStationByCode(int code) const {
+  for (CFMSEKvfGroupBase* station : ZoneItems(*this)) {
+    if (station->StationCode() < 1) return nullptr;
+    if (station->StationCode() == code) return station;
+  }
+  return nullptr;
+}
+
+CFMSEKvfGroupBase* C2DStationBasedDataKvf::SelectStationByName(const std::string& name) const {
+  for (CFMSEKvfGroupBase* station : ZoneItems(*this))
+    if (station->GetStationId() == name) return station;
+  return nullptr;
+}
+
+int C2DStationBasedDataKvf::IsDlgUsedInSetup() { return GetParent() ? GetParent()->IsDlgUsedInSetup() : 1; }
+
+int C2DStationBasedDataKvf::ValidateData() {
+  global_->SeriesFile().SetFileUsed(DistributionType == kUniform && global_->TYPE == CGlobalKvf::kTimeVarying);
+  stations_->GridFile().SetFileUsed(UsesGridCodes());
+  stations_->ShapeFile().SetValidateFlag(UsesPolygons());
+  fully_->GridFile().SetFileUsed(DistributionType == kFullyDistributed);
+  return 1;
+}
+
+CTimeseriesConstKvf::CTimeseriesConstKvf(int itemType, CYbSEKvfBase* parent)
+    : CTvnKvfBase("Time Constant", "Time Constant", parent),
+      itemType_(itemType),
+      global_(NewChild<CGlobalKvf>("Global", "GLOBAL", std::vector{itemType})) {
+  SetPage(kTimeseriesConstPage);
+}
+
+int CTimeseriesConstKvf::ValidateData() {
+  global_->SeriesFile().SetFileUsed(global_->TYPE == CGlobalKvf::kTimeVarying);
+  return 1;
+}
+
+}  // namespace tervane

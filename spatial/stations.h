@@ -1,0 +1,176 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Forcings that vary in space and time: one value or series for the whole model, one for each station area, or a grid
+// for each time step.
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "spatial/file_nodes.h"
+#include "spatial/zone_sync.h"
+
+namespace tervane {
+
+/// What the nodes of one forcing have in common: which quantities and kinds of value its files may hold.
+struct ForcingKind {
+  std::vector<int> itemTypes;   ///< The first is that of values typed on pages.
+  std::vector<int> valueTypes;  ///< Of new files, in the order of preference.
+};
+
+/// A constant or a time series.
+class CGlobalKvf : public CTvnKvfBase {
+ public:
+  CGlobalKvf(std::string title, std::string section, std::vector<int> itemTypes, CYbSEKvfBase* parent);
+
+  enum Temporal : int { kConstant = 0, kTimeVarying = 1 };
+
+  float FIXED_VALUE = 0;
+  int TYPE = kConstant;
+
+  CFMData0DFile& SeriesFile() const { return *file_; }
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  CFMData0DFile* file_;
+};
+
+/// How the station areas are given. The stations themselves are children of its parent.
+class CStationBasedKvf : public CTvnKvfBase {
+ public:
+  explicit CStationBasedKvf(CFMSEKvfBase* parent);
+
+  enum Source : int { kGridCodes = 0, kPolygons = 1 };
+
+  int TYPE = kGridCodes;
+  int ShapeAxisUnit;             ///< Of the polygons' coordinates, a unit key of item 100187.
+  std::string ShapeGapFillName;  ///< Of the station that fills the cells outside all polygons.
+
+  CTvnData2DNdsFile& GridFile() const { return *gridFile_; }
+  CData2DShpFile& ShapeFile() const { return *shapeFile_; }
+
+  void ReadData(KvfNode* section) override;
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  CFMSEKvfBase& owner_;
+  CTvnData2DNdsFile* gridFile_;
+  CData2DShpFile* shapeFile_;
+};
+
+/// One grid for each time step.
+class CFullyDistributedKvf : public CTvnKvfBase {
+ public:
+  CFullyDistributedKvf(int itemType, CYbSEKvfBase* parent);
+
+  int TYPE = 0;
+
+  CFMData2DNdsFile& GridFile() const { return *gridFile_; }
+  void ReadData(KvfNode* section) override;
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override { keys.FromOne("TYPE", TYPE); }
+
+ private:
+  CFMData2DNdsFile* gridFile_;
+};
+
+/// A station with its value or series.
+class C2DStationBasedDataTimeSeriesKvf : public CFMSEKvfGroupBase {
+ public:
+  C2DStationBasedDataTimeSeriesKvf(const ForcingKind& kind, CYbSEKvfBase* parent);
+
+  enum Temporal : int { kConstant = 0, kTimeVarying = 1 };
+
+  std::string NAME = "Undefined";
+  std::string GRIDCODEID = "Undefined";  ///< The grid code or the polygon's value.
+  float FIXED_VALUE = 0;
+  int TYPE = kTimeVarying;
+
+  CFMData0DFile& SeriesFile() const { return *file_; }
+
+  void SetStationName(const std::string& name) override { NAME = name; }
+  std::string GetStationName() const override { return NAME; }
+  void SetStationId(const std::string& id) override { GRIDCODEID = id; }
+  std::string GetStationId() const override { return GRIDCODEID; }
+
+  /// Counted among the stations alone.
+  int GetNumberWhatAmI() const override;
+  int IsDlgUsedInSetup() override;
+  int ValidateData() override;
+  void ReadData(KvfNode* section) override;
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  CFMData0DFile* file_;
+};
+
+/// A forcing.
+class C2DStationBasedDataKvf : public CFMSEKvfBase {
+ public:
+  C2DStationBasedDataKvf(int itemType, std::string title, std::string section, CYbSEKvfBase* parent);
+
+  enum Distribution : int { kUniform = 0, kStationBased = 1, kFullyDistributed = 2 };
+
+  int DistributionType = kUniform;
+
+  const ForcingKind& Kind() const { return kind_; }
+  int GetItemType() const { return kind_.itemTypes.front(); }
+  CGlobalKvf& Global() const { return *global_; }
+  CStationBasedKvf& Stations() const { return *stations_; }
+  CFullyDistributedKvf& FullyDistributed() const { return *fully_; }
+
+  bool UsesGridCodes() const {
+    return DistributionType == kStationBased && stations_->TYPE == CStationBasedKvf::kGridCodes;
+  }
+  bool UsesPolygons() const {
+    return DistributionType == kStationBased && stations_->TYPE == CStationBasedKvf::kPolygons;
+  }
+
+  std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
+  /// What the source of the station areas holds; nothing for the other distributions.
+  FoundZones FindStations() const;
+  SyncPlan PlanStations(const FoundZones& found) { return PlanSync(*this, found); }
+  /// Brings the stations in step; for another distribution than by stations all go.
+  SyncResult SyncStations(const FoundZones& found);
+  SyncResult SyncStations() { return SyncStations(FindStations()); }
+  CFMSEKvfGroupBase* SelectStationByCode(int code) const;
+  CFMSEKvfGroupBase* SelectStationByName(const std::string& name) const;
+  std::vector<std::string> GetStationNames() const { return ZoneItemTitles(*this); }
+
+  int IsDlgUsedInSetup() override;
+  int ValidateData() override;
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override { keys.FromOne("DistributionType", DistributionType); }
+
+ private:
+  ForcingKind kind_;
+  CGlobalKvf* global_;
+  CStationBasedKvf* stations_;
+  CFullyDistributedKvf* fully_;
+};
+
+/// A constant or a time series without anything spatial.
+class CTimeseriesConstKvf : public CTvnKvfBase {
+ public:
+  CTimeseriesConstKvf(int itemType, CYbSEKvfBase* parent);
+
+  int GetItemType() const { return itemType_; }
+  CGlobalKvf& Global() const { return *global_; }
+  int ValidateData() override;
+
+ private:
+  int itemType_;
+  CGlobalKvf* global_;
+};
+
+}  // namespace tervane
