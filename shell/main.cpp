@@ -2,11 +2,17 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <QApplication>
 #include <QDir>
+#include <QImage>
 #include <QTemporaryDir>
 #include <QTimer>
 #include <QTranslator>
+#include <algorithm>
 #include <cstdio>
+#include <cstdlib>
+#include <functional>
 #include <string>
+#include <unordered_map>
+#include <utility>
 #include <vector>
 
 #include <CLI/CLI.hpp>
@@ -36,6 +42,31 @@ QSize ParseSize(const std::string& text) {
   return isSize && width > 0 && height > 0 && width <= 20000 && height <= 20000 ? QSize(width, height) : QSize();
 }
 
+/// The image in 256 colours, which packs to half: shades at the edges of letters give way to those close to them that
+/// it has more of.
+QImage WithFewColors(const QImage& image) {
+  std::unordered_map<QRgb, int> counts;
+  for (int y = 0; y < image.height(); ++y)
+    for (int x = 0; x < image.width(); ++x) ++counts[image.pixel(x, y)];
+  std::vector<std::pair<int, QRgb>> colors;
+  for (const auto& [color, count] : counts) colors.emplace_back(count, color);
+  std::ranges::sort(colors, std::greater());
+  constexpr qsizetype kMost = 256;
+  QList<QRgb> table;
+  for (int distance = 0; distance == 0 || table.size() > kMost; ++distance) {
+    table.clear();
+    for (const auto& [count, color] : colors) {
+      const auto isClose = [&, color = color](QRgb other) {
+        return std::abs(qRed(color) - qRed(other)) <= distance && std::abs(qGreen(color) - qGreen(other)) <= distance &&
+               std::abs(qBlue(color) - qBlue(other)) <= distance;
+      };
+      if (std::ranges::none_of(table, isClose)) table << color;
+      if (table.size() > kMost) break;
+    }
+  }
+  return image.convertToFormat(QImage::Format_Indexed8, table, Qt::ThresholdDither | Qt::AvoidDither);
+}
+
 int Run(const Typed& typed, QApplication& application) {
   // A picture shows the program as it is for everybody, and leaves nothing in the user's settings.
   const bool isPicture = !typed.screenshot.empty();
@@ -63,7 +94,7 @@ int Run(const Typed& typed, QApplication& application) {
   }
   // Layouts settle when events have run.
   for (int i = 0; i < 3; ++i) application.processEvents();
-  if (!window.grab().save(ToQt(typed.screenshot))) {
+  if (!WithFewColors(window.grab().toImage()).save(ToQt(typed.screenshot))) {
     std::fprintf(stderr, "quarzel: %s cannot be written\n", typed.screenshot.c_str());
     return 2;
   }
