@@ -466,12 +466,10 @@ std::string DemangledName(const std::type_info& type) {
 
 std::uint32_t ProcessId() { return static_cast<std::uint32_t>(getpid()); }
 
-bool IsProcessAlive(std::uint32_t processId) {
-  if (processId == 0 || processId > static_cast<std::uint32_t>(INT_MAX)) return false;
-  return kill(static_cast<pid_t>(processId), 0) == 0 || errno == EPERM;
-}
+namespace {
 
-std::string ProcessStartTime(std::uint32_t processId) {
+/// A field of what the system tells of a process, from 3 on; empty where it tells nothing.
+std::string StatusField(std::uint32_t processId, int wanted) {
   std::ifstream file("/proc/" + std::to_string(processId) + "/stat");
   std::string text;
   std::getline(file, text, '\0');
@@ -480,12 +478,28 @@ std::string ProcessStartTime(std::uint32_t processId) {
   if (nameEnd == std::string::npos) return {};
   std::istringstream fields(text.substr(nameEnd + 1));
   std::string field;
+  for (int number = 3; number <= wanted; ++number) fields >> field;
+  return fields ? field : std::string();
+}
+
+}  // namespace
+
+bool IsProcessAlive(std::uint32_t processId) {
+  if (processId == 0 || processId > static_cast<std::uint32_t>(INT_MAX)) return false;
+  if (kill(static_cast<pid_t>(processId), 0) != 0 && errno != EPERM) return false;
+  // One that has ended stays in the table until its parent asks how it went.
+  constexpr int kState = 3;
+  const std::string state = StatusField(processId, kState);
+  return state != "Z" && state != "X";
+}
+
+std::string ProcessStartTime(std::uint32_t processId) {
   constexpr int kStartTime = 22;
-  for (int number = 3; number <= kStartTime; ++number) fields >> field;
+  const std::string field = StatusField(processId, kStartTime);
   // It counts from the start of the machine.
   std::string boot;
   std::ifstream("/proc/sys/kernel/random/boot_id") >> boot;
-  return fields ? field + " " + boot : std::string();
+  return field.empty() ? std::string() : field + " " + boot;
 }
 
 std::string HostName() {

@@ -11,6 +11,7 @@
 #include <QVBoxLayout>
 #include <algorithm>
 
+#include "core/doc_version.h"
 #include "core/path.h"
 #include "document/view_settings.h"
 #include "pages/findings.h"
@@ -342,6 +343,15 @@ void DocumentFrame::TellReport() {
   const LoadReport& report = session_->Document().Report();
   for (const LoadReport::Entry& entry : report.entries)
     if (entry.kind == LoadReport::Kind::Warning) host_.Tell(entry.text, Host::Icon::Warning);
+  const int version = session_->Document().Global().ReadDocVersion();
+  if (!session_->Path().empty() && version != CFlowModelDocVersionKvf::kWrittenVersion && report.unread.empty()) {
+    const QString written = version < 0 ? tr("an unnumbered version") : tr("version %1").arg(version);
+    ShowBanner(tr("This file was written by %1 and is saved as version %2. The first save keeps the file as it was "
+                  "beside the new one.")
+                   .arg(written)
+                   .arg(CFlowModelDocVersionKvf::kWrittenVersion),
+               {{tr("&What will be saved…"), [this] { emit ChangesWanted(); }}});
+  }
   if (report.unread.empty()) return;
   ShowBanner(
       tr("Things in this file that the editor does not know: %1. They are listed below; the first save keeps the "

@@ -203,7 +203,7 @@ void PageView::AddRow(Form& built, const std::vector<Control*>& row) {
     growsDown = widgets_.back()->GrowsDown();
   }
   if (row.size() == 1 && !label) {
-    grid.addWidget(cell, line, kLabelColumn, 1, 2);
+    grid.addWidget(cell, line, kLabelColumn, 1, 2, growsDown ? Qt::Alignment() : Qt::AlignTop);
   } else if (row.size() == 1) {
     // The label stands at the height of the field's first line.
     label->setContentsMargins(0, Theme::Get().Scaled(4), 0, 0);

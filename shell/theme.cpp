@@ -9,6 +9,7 @@
 #include <QPalette>
 #include <QPixmap>
 #include <QPointer>
+#include <QProxyStyle>
 #include <QStyleFactory>
 #include <QSvgRenderer>
 #include <algorithm>
@@ -57,13 +58,35 @@ QPalette DarkPalette() {
   return palette;
 }
 
+/// The style with marks that grow with the texts beside them.
+class ZoomedStyle : public QProxyStyle {
+ public:
+  ZoomedStyle() : QProxyStyle(QStyleFactory::create("Fusion")) {}
+
+  int pixelMetric(PixelMetric metric, const QStyleOption* option, const QWidget* widget) const override {
+    const int size = QProxyStyle::pixelMetric(metric, option, widget);
+    switch (metric) {
+      case PM_IndicatorWidth:
+      case PM_IndicatorHeight:
+      case PM_ExclusiveIndicatorWidth:
+      case PM_ExclusiveIndicatorHeight:
+      case PM_TreeViewIndentation:
+      case PM_SmallIconSize:
+      case PM_ListViewIconSize:
+        return theTheme ? theTheme->Scaled(size) : size;
+      default:
+        return size;
+    }
+  }
+};
+
 }  // namespace
 
 Theme::Theme() {
   theTheme = this;
   systemIsDark_ = QApplication::palette().color(QPalette::Window).lightness() < 128;
   basePointSize_ = QApplication::font().pointSizeF() > 0 ? QApplication::font().pointSizeF() : 10;
-  QApplication::setStyle(QStyleFactory::create("Fusion"));
+  QApplication::setStyle(new ZoomedStyle);
   Apply();
 }
 
