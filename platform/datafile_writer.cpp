@@ -438,9 +438,8 @@ FileResult DataFileWriter::Finish() {
   result.error = state->failure;
   if (!result.Ok()) return result;
   if (!state->file.IsOpen()) return {"no file is being written", {}};
-  if (!state->content.hasTime || state->step) {
-    if (const std::string reason = state->WhyStepIsIncomplete(); !reason.empty()) return {state->Fail(reason), {}};
-  }
+  if (state->content.hasTime && !state->step) return {state->Fail("no step was begun"), {}};
+  if (const std::string reason = state->WhyStepIsIncomplete(); !reason.empty()) return {state->Fail(reason), {}};
   {
     const netcdf::Lock lock;
     Calls call;
