@@ -27,6 +27,9 @@ class Lock {
   std::lock_guard<std::mutex> guard_;
 };
 
+/// Of a classic file that is written, in bytes.
+inline constexpr std::size_t kBufferSize = std::size_t{1} << 18;
+
 /// Why a call failed, for the person who must act.
 std::string InWords(int status);
 
