@@ -3,6 +3,7 @@
 #include "cli/command_line.h"
 
 #include <algorithm>
+#include <map>
 
 #include <CLI/CLI.hpp>
 
@@ -99,6 +100,46 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
   command("keys", "List all keys with place, type and default", [&] {
     return KeysCommand(typed.markdown, streams);
   })->add_flag("--markdown", typed.markdown, "As a page of the manual");
+
+  CLI::App* data = app.add_subcommand("data", "Look into data files (.nds0 to .nds3, netCDF)");
+  data->require_subcommand(1);
+  const auto dataCommand = [&](const char* name, const char* description, auto run) {
+    CLI::App* subcommand = data->add_subcommand(name, description);
+    subcommand->callback([&status, run] { status = run(); });
+    subcommand->add_option("FILE", typed.file, "The data file")->required();
+    return subcommand;
+  };
+  dataCommand("info", "Tell items, times and place", [&] {
+    return DataInfoCommand(typed.file, typed.json, streams);
+  })->add_flag("--json", typed.json, "As JSON");
+  dataCommand("stats", "Tell range, mean and missing values of each item",
+              [&] { return DataStatsCommand(typed.file, streams); });
+
+  CLI::App* import = app.add_subcommand("import", "Make data files of other files");
+  import->require_subcommand(1);
+  CLI::App* series = import->add_subcommand("series", "Make a time series (.nds0) of a column of a table (CSV)");
+  SeriesImport seriesImport;
+  series->callback([&] { status = ImportSeriesCommand(seriesImport, streams); });
+  series->add_option("CSV", seriesImport.in, "The table: names in its first line, ISO dates in its first column")
+      ->required();
+  series->add_option("OUT", seriesImport.out, "The data file to write")->required();
+  series->add_option("--item", seriesImport.itemType, "The code of the item type")->required();
+  series->add_option("--column", seriesImport.column, "The name of the column; not needed where there is only one");
+  series->add_option("--unit", seriesImport.unit, "The unit of the values; the item type's base unit without it");
+  const std::map<std::string, int> valueTypes{
+      {"instantaneous", 0}, {"accumulated", 1}, {"step-accumulated", 2}, {"mean-step", 3}};
+  series->add_option("--value-type", seriesImport.valueType, "How a value belongs to its stamp")
+      ->transform(CLI::CheckedTransformer(valueTypes));
+  const std::map<std::string, bool> stampPlaces{{"begin", true}, {"end", false}};
+  series->add_option("--stamps", seriesImport.stampsAreBegins, "Which end of its interval a stamp is; end without it")
+      ->transform(CLI::CheckedTransformer(stampPlaces));
+  series->add_flag("--force", seriesImport.force, "Replace a file that exists");
+
+  CLI::App* exporting = command("export", "Write time series (.nds0) as a table (CSV)",
+                                [&] { return ExportCommand(typed.file, typed.secondFile, typed.force, streams); });
+  exporting->add_option("FILE", typed.file, "The data file")->required();
+  exporting->add_option("OUT", typed.secondFile, "The table to write")->required();
+  exporting->add_flag("--force", typed.force, "Replace a file that exists");
 
   command("completion", "Print the completion script for bash; use: source <(tervane completion)", [&] {
     out << BashCompletion(app);

@@ -13,7 +13,10 @@ struct Streams {
   std::ostream& err;
 };
 
-// Each gives an `ExitStatus`.
+/// True, with a message, when the file exists and is not to be replaced.
+bool RefuseToReplace(const std::string& file, bool force, Streams streams);
+
+// Each of the following gives an `ExitStatus`.
 
 int NewCommand(const std::string& file, bool force, Streams streams);
 int ConvertCommand(const std::string& in, const std::string& out, bool force, Streams streams);
@@ -32,5 +35,23 @@ int SetCommand(const std::string& file, const std::string& path, const std::stri
 
 int DiffCommand(const std::string& from, const std::string& to, bool json, Streams streams);
 int KeysCommand(bool markdown, Streams streams);
+
+/// What a data file holds, by its header alone.
+int DataInfoCommand(const std::string& path, bool json, Streams streams);
+/// The range, mean and missing values of each item; reads the whole file.
+int DataStatsCommand(const std::string& path, Streams streams);
+
+/// What makes a data file of a column of a table.
+struct SeriesImport {
+  std::string in, out;
+  int itemType = 0;
+  std::string column, unit;
+  int valueType = 0;
+  bool stampsAreBegins = false;
+  bool force = false;
+};
+int ImportSeriesCommand(const SeriesImport& import, Streams streams);
+/// Time series as a table.
+int ExportCommand(const std::string& in, const std::string& out, bool force, Streams streams);
 
 }  // namespace tervane

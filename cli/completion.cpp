@@ -22,11 +22,16 @@ std::string BashCompletion(const CLI::App& app) {
   std::string commands, cases;
   for (const CLI::App* command : app.get_subcommands({})) {
     commands += " " + command->get_name();
-    cases += fmt::format("    {}) options=\"{}\" ;;\n", command->get_name(), OptionNames(*command).substr(1));
+    std::string words, options = OptionNames(*command);
+    for (const CLI::App* subcommand : command->get_subcommands({})) {
+      words += " " + subcommand->get_name();
+      options += OptionNames(*subcommand);
+    }
+    cases += fmt::format("    {}) options=\"{}\" words=\"{}\" ;;\n", command->get_name(), options.substr(1), words);
   }
   return fmt::format(R"bash(# bash completion of tervane: source <(tervane completion)
 _tervane() {{
-  local current="${{COMP_WORDS[COMP_CWORD]}}" command="${{COMP_WORDS[1]}}" options=""
+  local current="${{COMP_WORDS[COMP_CWORD]}}" command="${{COMP_WORDS[1]}}" options="" words=""
   COMPREPLY=()
   if ((COMP_CWORD == 1)); then
     mapfile -t COMPREPLY < <(compgen -W "{}{}" -- "$current")
@@ -36,6 +41,8 @@ _tervane() {{
 {}  esac
   if [[ "$current" == -* ]]; then
     mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
+  elif ((COMP_CWORD == 2)) && [ -n "$words" ]; then
+    mapfile -t COMPREPLY < <(compgen -W "$words" -- "$current")
   elif ((COMP_CWORD == 3)) && [[ "$command" =~ ^(show|page|get|set)$ ]]; then
     local IFS=$'\n'
     mapfile -t COMPREPLY < <(compgen -W "$(tervane tree "${{COMP_WORDS[2]}}" --all --paths 2>/dev/null)" -- "$current")

@@ -21,14 +21,14 @@ int Save(CFlowModelDoc& document, const std::string& file, Streams streams) {
   return kDone;
 }
 
+}  // namespace
+
 bool RefuseToReplace(const std::string& file, bool force, Streams streams) {
   if (RefuseHeld(file, force, streams)) return true;
   if (force || !FileExists(file)) return false;
   fmt::print(streams.err, "{} exists; choose another name, or add --force to replace it\n", file);
   return true;
 }
-
-}  // namespace
 
 int NewCommand(const std::string& file, bool force, Streams streams) {
   if (RefuseToReplace(file, force, streams)) return kCouldNot;

@@ -56,10 +56,11 @@ Role RoleOfName(std::string_view name) {
   return Role::Unknown;
 }
 
+/// True for "degrees_north" and its other spellings; the direction is "north" or "N".
 bool IsDegrees(std::string_view units, std::string_view direction) {
-  for (const char* form : {"degrees_{}", "degree_{}", "degrees{}", "degree{}"})
-    if (units == fmt::format(fmt::runtime(form), direction)) return true;
-  return false;
+  if (!units.starts_with("degree") || !units.ends_with(direction)) return false;
+  const std::string_view between = units.substr(6, units.size() - 6 - direction.size());
+  return between.empty() || between == "s" || between == "_" || between == "s_";
 }
 
 /// Reads the header of a file into items, times and notes.

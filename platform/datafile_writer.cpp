@@ -307,14 +307,12 @@ std::string DataFileWriter::State::PutPart(int item, std::optional<int> layer, s
   if (isDoubled) return refused(fmt::format("item {} was put twice in step {}", item, step.value_or(0) + 1));
 
   std::vector<float> finite;
-  bool isFinite = true;
-  for (const float value : values) isFinite = isFinite & (std::abs(value) <= std::numeric_limits<float>::max());
-  if (!isFinite) {
+  if (!AreFinite(values)) {
     finite.assign(values.begin(), values.end());
     for (float& value : finite) value = std::isfinite(value) ? value : kDeleteValue;
     values = finite;
   }
-  summaries[index].Add(values);
+  summaries[index].AddRange(values);
 
   std::vector<std::size_t> start, count;
   if (content.hasTime) {
@@ -367,8 +365,11 @@ std::string DataFileWriter::Create(const std::string& path, const NewDataFile& c
   {
     const netcdf::Lock lock;
     int id = -1;
-    int status = nc_create(AbsoluteFromHere(state->replacement.TemporaryPath()).c_str(),
-                           NC_CLOBBER | (content.isCompressed ? NC_NETCDF4 : NC_64BIT_OFFSET), &id);
+    // The library's own buffer is a few kB, and it seeks, reads and writes for each of them.
+    std::size_t buffer = netcdf::kBufferSize;
+    const int format = content.isCompressed ? NC_NETCDF4 : NC_64BIT_OFFSET;
+    int status =
+        nc__create(AbsoluteFromHere(state->replacement.TemporaryPath()).c_str(), NC_CLOBBER | format, 0, &buffer, &id);
     if (status == NC_NOERR) {
       state->file = netcdf::Handle(id);
       status = state->Define();
@@ -438,9 +439,8 @@ FileResult DataFileWriter::Finish() {
   result.error = state->failure;
   if (!result.Ok()) return result;
   if (!state->file.IsOpen()) return {"no file is being written", {}};
-  if (!state->content.hasTime || state->step) {
-    if (const std::string reason = state->WhyStepIsIncomplete(); !reason.empty()) return {state->Fail(reason), {}};
-  }
+  if (state->content.hasTime && !state->step) return {state->Fail("no step was begun"), {}};
+  if (const std::string reason = state->WhyStepIsIncomplete(); !reason.empty()) return {state->Fail(reason), {}};
   {
     const netcdf::Lock lock;
     Calls call;

@@ -27,6 +27,9 @@ class Lock {
   std::lock_guard<std::mutex> guard_;
 };
 
+/// Of a classic file that is written, in bytes.
+inline constexpr std::size_t kBufferSize = std::size_t{1} << 18;
+
 /// Why a call failed, for the person who must act.
 std::string InWords(int status);
 
@@ -63,8 +66,7 @@ std::optional<int> IntAttribute(int file, int variable, const char* name);
 /// Checks a classic netCDF file (CDF-1, -2, -5) against its own header, since the library reads what was cut off as
 /// zeros and takes every count of a damaged header at its word. "" when it is whole or of another kind, else what is
 /// wrong: "it is cut: it has 120 bytes, its header tells of 4096". `isClassic` tells the kind.
-/// Layout: the NetCDF Classic Format Specification,
-/// https://docs.unidata.ucar.edu/nug/current/file_format_specifications.html
+/// Layout: the chapter on file formats of the NetCDF Users Guide, https://docs.unidata.ucar.edu/nug/current/.
 std::string WhyClassicFileIsBad(const std::string& path, bool& isClassic);
 
 }  // namespace tervane::netcdf

@@ -1,0 +1,187 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <algorithm>
+#include <new>
+#include <vector>
+
+#include <fmt/format.h>
+#include <fmt/ostream.h>
+
+#include "cli/command_line.h"
+#include "cli/commands.h"
+#include "cli/json.h"
+#include "platform/datafile.h"
+#include "platform/datafile_request.h"
+#include "platform/text.h"
+
+namespace tervane {
+
+namespace {
+
+/// Opens a data file; its notes, or why it cannot be read, go to the error stream.
+bool OpenDataFile(DataFile& file, const std::string& path, Streams streams) {
+  if (const std::string error = file.Open(path); !error.empty()) {
+    fmt::print(streams.err, "{}\n", error);
+    return false;
+  }
+  for (const std::string& note : file.Notes()) fmt::print(streams.err, "{}: note: {}\n", path, note);
+  return true;
+}
+
+std::string SizeText(const DataItem& item) {
+  const FileGeometry& geometry = item.geometry;
+  switch (item.dimensions) {
+    case 0:
+      return "time series";
+    case 1:
+      return fmt::format("line of {}", geometry.nx);
+    case 2:
+      return fmt::format("grid {} x {}", geometry.nx, geometry.ny);
+    default:
+      return fmt::format("grid {} x {} in {} layers", geometry.nx, geometry.ny, geometry.nz);
+  }
+}
+
+std::string PlaceText(const FileGeometry& geometry) {
+  if (!geometry.IsPlaced()) return "place unknown";
+  const std::string_view unit = geometry.isGeographical ? "degrees" : "m";
+  std::string text = fmt::format("cells of {}", ShortestNumber(geometry.cellSize));
+  if (geometry.cellHeight != geometry.cellSize) text += fmt::format(" x {}", ShortestNumber(geometry.cellHeight));
+  text += fmt::format(" {} from {}, {}", unit, ShortestNumber(geometry.x0), ShortestNumber(geometry.y0));
+  if (geometry.rotation != 0) text += fmt::format(", turned by {} degrees", ShortestNumber(geometry.rotation));
+  return text + (geometry.projection.empty() ? ", no projection" : ", projection " + geometry.projection);
+}
+
+std::string TimeText(const TimeAxis& time) {
+  std::string text = fmt::format("{} step{}", time.steps, time.steps == 1 ? "" : "s");
+  if (time.stamps.empty()) return text + (time.hasDates ? "" : " without dates");
+  text += fmt::format(" from {} to {}", DateInWords(time.Start()), DateInWords(time.End()));
+  if (time.stepSeconds > 0) text += fmt::format(" every {} s", time.stepSeconds);
+  if (time.begin && *time.begin < time.Start()) {
+    text += fmt::format(", the first begins at {}", DateInWords(*time.begin));
+  }
+  return text;
+}
+
+std::string_view ItemTypeName(const DataItem& item) { return FindItemType(item.itemType)->name; }
+
+void WriteInfoAsText(const DataFile& file, std::ostream& out) {
+  fmt::print(out, "{}: {} item{}\ntime: {}\n", file.Path(), file.Items().size(), file.Items().size() == 1 ? "" : "s",
+             TimeText(file.Time()));
+  int number = 0;
+  for (const DataItem& item : file.Items()) {
+    fmt::print(out, "item {}: {} [{}], {} ({}), {}, {}\n", ++number, item.name, item.unitText, ItemTypeName(item),
+               item.itemType, item.hasTime ? ValueTypeText(item.valueType) : "at all times", SizeText(item));
+    const bool isSame = number > 1 && item.geometry == file.Items()[static_cast<std::size_t>(number - 2)].geometry;
+    if (item.dimensions > 0 && !isSame) fmt::print(out, "  {}\n", PlaceText(item.geometry));
+  }
+}
+
+std::string JsonDate(const CYbDateTime& date) { return JsonQuoted(date.Format("%Y-%m-%d %H:%M:%S")); }
+
+void WriteInfoAsJson(const DataFile& file, std::ostream& out) {
+  std::vector<std::string> items, notes;
+  for (const DataItem& item : file.Items()) {
+    const FileGeometry& geometry = item.geometry;
+    const auto whenPlaced = [&](double number) { return geometry.IsPlaced() ? ShortestNumber(number) : std::string(); };
+    const auto when = [](bool is, int number) { return is ? std::to_string(number) : std::string(); };
+    items.push_back(JsonObject({{"name", JsonQuoted(item.name)},
+                                {"itemType", std::to_string(item.itemType)},
+                                {"itemTypeName", JsonQuoted(ItemTypeName(item))},
+                                {"unitKey", when(item.unitKey != 0, item.unitKey)},
+                                {"unit", JsonQuoted(item.unitText)},
+                                {"valueType", std::to_string(static_cast<int>(item.valueType))},
+                                {"hasTime", JsonBool(item.hasTime)},
+                                {"dimensions", std::to_string(item.dimensions)},
+                                {"nx", when(item.dimensions > 0, geometry.nx)},
+                                {"ny", when(item.dimensions > 1, geometry.ny)},
+                                {"nz", when(item.dimensions > 2, geometry.nz)},
+                                {"cellSize", whenPlaced(geometry.cellSize)},
+                                {"cellHeight", whenPlaced(geometry.cellHeight)},
+                                {"x0", whenPlaced(geometry.x0)},
+                                {"y0", whenPlaced(geometry.y0)},
+                                {"rotation", whenPlaced(geometry.rotation)},
+                                {"geographical", geometry.IsPlaced() ? JsonBool(geometry.isGeographical) : ""},
+                                {"projection", geometry.projection.empty() ? "" : JsonQuoted(geometry.projection)}}));
+  }
+  for (const std::string& note : file.Notes()) notes.push_back(JsonQuoted(note));
+  const TimeAxis& time = file.Time();
+  const bool hasStamps = !time.stamps.empty();
+  fmt::print(out, "{}\n",
+             JsonObject({{"steps", std::to_string(time.steps)},
+                         {"start", hasStamps ? JsonDate(time.Start()) : ""},
+                         {"end", hasStamps ? JsonDate(time.End()) : ""},
+                         {"begin", time.begin ? JsonDate(*time.begin) : ""},
+                         {"stepSeconds", time.stepSeconds > 0 ? std::to_string(time.stepSeconds) : ""},
+                         {"items", JsonArray(items)},
+                         {"notes", JsonArray(notes)}}));
+}
+
+void WriteSummary(std::string_view place, const ValueSummary& summary, std::ostream& out) {
+  if (summary.count == 0) {
+    fmt::print(out, "{}: no values, {} missing\n", place, summary.missing);
+    return;
+  }
+  fmt::print(out, "{}: smallest {}, largest {}, mean {:.6g}, {} values, {} missing\n", place,
+             ShortestNumber(summary.smallest), ShortestNumber(summary.largest), summary.Mean(), summary.count,
+             summary.missing);
+}
+
+/// Reads all values of an item once.
+std::string Summarize(const DataFile& file, int number, std::vector<ValueSummary>& steps) {
+  const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)];
+  const std::size_t count = item.hasTime ? file.Time().steps : 1;
+  // A series is one call, and its steps are single values.
+  const bool isSeries = item.dimensions == 0;
+  std::vector<float> values;
+  ValueSelection selection;
+  selection.item = number;
+  if (isSeries) selection.steps = count;
+  values.resize(file.SizeOf(selection));
+  for (; selection.step < count; selection.step += selection.steps) {
+    if (std::string error = file.Read(selection, values); !error.empty()) return error;
+    steps.emplace_back().Add(values);
+  }
+  return {};
+}
+
+}  // namespace
+
+int DataInfoCommand(const std::string& path, bool json, Streams streams) {
+  DataFile file;
+  if (!OpenDataFile(file, path, streams)) return kCouldNot;
+  json ? WriteInfoAsJson(file, streams.out) : WriteInfoAsText(file, streams.out);
+  return kDone;
+}
+
+int DataStatsCommand(const std::string& path, Streams streams) {
+  /// Of a file with more steps, only the whole is told.
+  constexpr std::size_t kMostStepsTold = 24;
+  DataFile file;
+  if (!OpenDataFile(file, path, streams)) return kCouldNot;
+  for (std::size_t i = 0; i < file.Items().size(); ++i) {
+    const DataItem& item = file.Items()[i];
+    std::vector<ValueSummary> steps;
+    std::string error;
+    try {
+      error = Summarize(file, static_cast<int>(i + 1), steps);
+    } catch (const std::bad_alloc&) {
+      error = fmt::format("cannot read {}: the item {} needs more than the free memory", path, item.name);
+    }
+    if (!error.empty()) {
+      fmt::print(streams.err, "{}\n", error);
+      return kCouldNot;
+    }
+    ValueSummary all;
+    for (const ValueSummary& step : steps) all.Add(step);
+    WriteSummary(fmt::format("item {}: {} [{}]", i + 1, item.name, item.unitText), all, streams.out);
+    if (steps.size() < 2 || steps.size() > kMostStepsTold) continue;
+    for (std::size_t step = 0; step < steps.size(); ++step) {
+      const std::string date = file.Time().stamps.empty() ? "" : ", " + DateInWords(file.Time().Stamp(step));
+      WriteSummary(fmt::format("  step {}{}", step + 1, date), steps[step], streams.out);
+    }
+  }
+  return kDone;
+}
+
+}  // namespace tervane
