@@ -111,6 +111,8 @@ void PageView::Build(const QString& path) {
   }
   AlignLabels();
   Sync();
+  // What is hidden before it was ever shown leaves the sizes that the layouts above it know.
+  for (QLayout* layout : findChildren<QLayout*>()) layout->invalidate();
 }
 
 PageView::~PageView() = default;
