@@ -63,8 +63,10 @@ FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridDa
   content.geometry.y0 = geometry.y0;
   content.geometry.rotation = geometry.rotation;
   content.geometry.projection = geometry.projection;
-  content.items.push_back({grid.ItemName(), grid.ItemType(), grid.ItemUnit() ? grid.ItemUnit() : kDimensionlessUnit,
-                           ValueType::Instantaneous});
+  const ItemType* type = FindItemType(grid.ItemType());
+  const int baseUnit = type ? BaseUnit(*type).key : kDimensionlessUnit;
+  content.items.push_back({grid.ItemName().empty() ? "Grid" : grid.ItemName(), grid.ItemType(),
+                           grid.ItemUnit() ? grid.ItemUnit() : baseUnit, ValueType::Instantaneous});
   content.hasTime = false;
   DataFileWriter writer;
   if (std::string error = writer.Create(path, content); !error.empty()) return Failed(std::move(error));

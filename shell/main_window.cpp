@@ -20,6 +20,7 @@
 #include "document/edit_session.h"
 #include "platform/files.h"
 #include "shell/changes_dialog.h"
+#include "shell/data_viewer.h"
 #include "shell/document_frame.h"
 #include "shell/program.h"
 #include "shell/qt_text.h"
@@ -83,6 +84,7 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   connect(
       frame, &DocumentFrame::ReloadWanted, this, [this, frame] { ReloadDocument(frame); }, Qt::QueuedConnection);
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
+  connect(frame, &DocumentFrame::DataFileWanted, this, &MainWindow::ShowDataFile);
   tabs_->setCurrentIndex(tabs_->addTab(frame, frame->Title()));
   frame->FocusNextPane();
   SyncCommands();
@@ -176,6 +178,14 @@ bool MainWindow::SaveDocumentAs() {
       frame->Session().Path().empty() ? FromQt(frame->Name() + ".tvd") : frame->Session().Path();
   const auto path = host_.AskFileToSave({"Save As", kSetupFilter, "tvd", current});
   return path && frame->Save(*path);
+}
+
+void MainWindow::ShowDataFile(const QString& path) {
+  std::string problem;
+  auto* viewer = new DataViewer(FromQt(path), host_, program_.Units(), problem, this);
+  if (problem.empty()) return viewer->show();
+  delete viewer;
+  host_.Tell(problem, Host::Icon::Error);
 }
 
 void MainWindow::ReloadDocument(DocumentFrame* frame) {

@@ -75,6 +75,7 @@ class MainWindow : public QMainWindow {
   void RestyleCommands();
 
   DocumentFrame* AddFrame(std::unique_ptr<EditSession> session);
+  void ShowDataFile(const QString& path);
   void ReloadDocument(DocumentFrame* frame);
   void ShowChanges(DocumentFrame& frame);
   void CopyToKeyboardWidget(const char* operation);
