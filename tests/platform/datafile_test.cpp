@@ -28,7 +28,7 @@ class ForeignFile : public testing::Test {
   TempFolder folder;
 
   void SetUp() override {
-    if (std::system("command -v ncgen >/dev/null") != 0) GTEST_SKIP() << "needs ncgen";
+    ASSERT_EQ(std::system("command -v ncgen >/dev/null"), 0) << "ncgen makes the files of others: run scripts/packages";
   }
   std::string Make(const std::string& text, const std::string& kind = "classic") const {
     const std::string source = folder.Write("a.cdl", text);
