@@ -53,16 +53,21 @@ FileResult ReadGridData(const std::string& path, int number, CTvn2DOrthoRotatedG
   return {};
 }
 
+FileGeometry FileGeometryOf(const GridGeometry& geometry) {
+  FileGeometry place;
+  place.nx = geometry.nx;
+  place.ny = geometry.ny;
+  place.cellSize = place.cellHeight = geometry.cellSize;
+  place.x0 = geometry.x0;
+  place.y0 = geometry.y0;
+  place.rotation = geometry.rotation;
+  place.projection = geometry.projection;
+  return place;
+}
+
 FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridData& grid) {
-  const GridGeometry& geometry = grid.Geometry();
   NewDataFile content;
-  content.geometry.nx = geometry.nx;
-  content.geometry.ny = geometry.ny;
-  content.geometry.cellSize = content.geometry.cellHeight = geometry.cellSize;
-  content.geometry.x0 = geometry.x0;
-  content.geometry.y0 = geometry.y0;
-  content.geometry.rotation = geometry.rotation;
-  content.geometry.projection = geometry.projection;
+  content.geometry = FileGeometryOf(grid.Geometry());
   const ItemType* type = FindItemType(grid.ItemType());
   const int baseUnit = type ? BaseUnit(*type).key : kDimensionlessUnit;
   content.items.push_back({grid.ItemName().empty() ? "Grid" : grid.ItemName(), grid.ItemType(),

@@ -1,0 +1,74 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "engine/model_grids.h"
+
+#include <cmath>
+
+#include <fmt/format.h>
+
+#include "platform/datafile_writer.h"
+#include "platform/grid_files.h"
+#include "platform/grid_resample.h"
+
+namespace tervane {
+
+namespace {
+
+/// The share of a run that the making of grids takes, in percent.
+constexpr int kBegin = 10, kEnd = 90;
+
+}  // namespace
+
+int ModelGridFile::Add(ModelGrid grid) {
+  grids_.push_back(std::move(grid));
+  return static_cast<int>(grids_.size());
+}
+
+bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, EngineLog& log) {
+  NewDataFile content;
+  content.geometry = FileGeometryOf(domain.Geometry());
+  content.hasTime = false;
+  for (const ModelGrid& grid : grids_) {
+    const ItemType* type = FindItemType(grid.itemType);
+    content.items.push_back({grid.title, grid.itemType, type ? BaseUnit(*type).key : kDimensionlessUnit});
+  }
+  DataFileWriter writer;
+  if (const std::string error = writer.Create(path_, content); !error.empty()) {
+    log.Error({}, error);
+    return false;
+  }
+  for (std::size_t n = 0; n < grids_.size(); ++n) {
+    ModelGrid& grid = grids_[n];
+    log.Progress(kBegin + static_cast<int>((kEnd - kBegin) * n / grids_.size()), grid.title);
+    CTvn2DOrthoRotatedGridData source;
+    if (const FileResult made = grid.make(source); !made.Ok()) {
+      log.Error(grid.place, made.error);
+      return false;
+    }
+    const bool isCode = grid.itemType == kCodeItemType;
+    std::vector<float> values =
+        Resample(source, domain.Geometry(), isCode ? Resampling::Nearest : Resampling::Bilinear);
+    std::size_t missing = 0;
+    for (std::size_t cell = 0; cell < values.size(); ++cell) {
+      const bool isInside = !domain.IsEmptyValue(domain.Values()[cell]);
+      if (!isInside || values[cell] == kUsualDeleteValue) {
+        values[cell] = kDeleteValue;
+        missing += isInside;
+      }
+    }
+    grid.values.Add(values);
+    if (isCode)
+      for (const float value : values)
+        if (value != kDeleteValue) ++grid.cellsOfCode[static_cast<int>(std::lround(value))];
+    if (missing > 0) log.Warning(grid.place, fmt::format("{} cells of the domain have no {}", missing, grid.title));
+    if (const std::string error = writer.Put(static_cast<int>(n) + 1, values); !error.empty()) {
+      log.Error(grid.place, error);
+      return false;
+    }
+  }
+  const FileResult finished = writer.Finish();
+  if (!finished.Ok()) log.Error({}, finished.error);
+  return finished.Ok();
+}
+
+}  // namespace tervane

@@ -1,0 +1,50 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The quantities of a setup on the cells of its model, in one data file.
+#pragma once
+
+#include <functional>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "engine/engine_log.h"
+#include "platform/datafile.h"
+#include "platform/grid.h"
+
+namespace tervane {
+
+/// A quantity that is to be put on the model's cells.
+struct ModelGrid {
+  std::string title;
+  std::string place;  ///< Path of the node, for messages.
+  int itemType = kUndefinedItemType;
+  /// Makes the values, in the item type's base unit, on any grid in the model's plane.
+  std::function<FileResult(CTvn2DOrthoRotatedGridData&)> make;
+  std::function<std::string(int code)> nameOfCode;  ///< Of the zones of a quantity of codes.
+
+  // Known when the values were written.
+  ValueSummary values;
+  std::map<int, std::size_t> cellsOfCode;  ///< Of a quantity of codes.
+};
+
+/// Collects quantities, and writes them as the items of one file.
+class ModelGridFile {
+ public:
+  explicit ModelGridFile(std::string path) : path_(std::move(path)) {}
+
+  const std::string& Path() const { return path_; }
+  const std::vector<ModelGrid>& Grids() const { return grids_; }
+  /// The number that the quantity's item will have.
+  int Add(ModelGrid grid);
+  /// Makes one quantity after the other, puts it on the cells of the domain, and writes it. Outside the domain all is
+  /// empty. False when one could not be made, which the log tells; then an old file stands.
+  bool Write(const CTvn2DOrthoRotatedGridData& domain, EngineLog& log);
+
+ private:
+  std::string path_;
+  std::vector<ModelGrid> grids_;
+};
+
+}  // namespace tervane

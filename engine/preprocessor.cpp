@@ -1,0 +1,317 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "engine/preprocessor.h"
+
+#include <filesystem>
+#include <utility>
+
+#include <fmt/format.h>
+
+#include "platform/datafile.h"
+#include "platform/grid_files.h"
+#include "platform/paths.h"
+#include "platform/text.h"
+#include "simspec/periods.h"
+#include "spatial/data2d.h"
+#include "spatial/domain.h"
+#include "spatial/domain_boundary.h"
+#include "spatial/stations.h"
+#include "spatial/zones.h"
+
+namespace tervane {
+
+namespace {
+
+/// Threads of one interpolation.
+constexpr int kThreads = 2;
+
+std::string WithDetail(const Finding& finding) {
+  return finding.detail.empty() ? finding.text : fmt::format("{} ({})", finding.text, finding.detail);
+}
+
+std::string PlaceOf(const std::string& path, const Finding& finding) {
+  return finding.key.empty() ? path : path + ":" + finding.key;
+}
+
+/// A value in the base unit of its quantity, with the unit.
+std::string WithUnit(double value, int itemType) {
+  const ItemType* type = FindItemType(itemType);
+  if (!type) return FormatNumber(value, "%.6g");
+  const std::string number = FormatQuantity(value, *type, BaseUnit(*type).key);
+  const std::string_view unit = BaseUnit(*type).abbreviation;
+  return unit.empty() ? number : fmt::format("{} {}", number, unit);
+}
+
+/// The mean of the steps of a file of grids that end within a period, or of all steps where the file has no dates.
+FileResult MeanOfSteps(const std::string& path, int number, const CYbDateTime& start, const CYbDateTime& end,
+                       CTvn2DOrthoRotatedGridData& grid) {
+  // The first step brings geometry and unit.
+  if (FileResult read = ReadGridData(path, number, grid); !read.Ok()) return read;
+  DataFile file;
+  if (const std::string error = file.Open(path); !error.empty()) return {error, {}};
+  const std::size_t cells = grid.Geometry().CellCount();
+  std::vector<double> sums(cells, 0.0);
+  std::vector<std::uint32_t> counts(cells, 0);
+  std::vector<float> values(cells);
+  for (std::size_t step = 0; step < file.Time().steps; ++step) {
+    if (file.Time().hasDates && (file.Time().Stamp(step) < start || end < file.Time().Stamp(step))) continue;
+    if (const std::string error = file.Read({number, step, 1, {}}, values, grid.ItemType()); !error.empty())
+      return {error, {}};
+    for (std::size_t cell = 0; cell < cells; ++cell) {
+      if (values[cell] == kDeleteValue) continue;
+      sums[cell] += static_cast<double>(values[cell]);
+      ++counts[cell];
+    }
+  }
+  float* means = grid.GetData();
+  for (std::size_t cell = 0; cell < cells; ++cell)
+    means[cell] = counts[cell] ? static_cast<float>(sums[cell] / counts[cell]) : grid.DeleteValue();
+  return {};
+}
+
+}  // namespace
+
+Preprocessor::Preprocessor(CFlowModelDoc& document, EngineLog& log)
+    : document_(document),
+      log_(log),
+      catchment_(document.Root().Important<CCatchmentKvf>("CATCHMENT")),
+      period_(document.Root().Important<CSimPeriodKvf>("SIMPERIOD")),
+      grids_(ResolvedPath(ResultFileName(document.getResultFolder(),
+                                         std::string(BaseNameOf(document.PathName())) + "_PreProcessed", ".nds2"),
+                          {})) {}
+
+bool Preprocessor::Run() {
+  log_.Progress(2, "Checking the setup");
+  if (!CheckSetup() || !MakeResultFolder() || !MakeDomain()) return false;
+  report_.top.title = std::string(BaseNameOf(document_.PathName()));
+  AddPagesBelow(document_.Root(), report_.top);
+  if (!grids_.Write(*domain_, log_)) return false;
+  log_.Progress(95, "Writing the report");
+  report_.top.ShowText(SummaryText());
+  const std::string path = ResolvedPath(document_.PreprocessorReport(), {});
+  if (const std::string error = WriteReport(path, report_); !error.empty()) {
+    log_.Error({}, error);
+    return false;
+  }
+  log_.Line("wrote " + path);
+  return true;
+}
+
+bool Preprocessor::CheckSetup() {
+  WalkNodes(document_.Root(), [&](const NodePlace& place) {
+    if (!place.takesPart) return;
+    bool isFaulty = false;
+    for (const Finding& finding : place.node.Findings()) {
+      const std::string where = PlaceOf(place.path, finding);
+      if (finding.severity == Severity::Error)
+        log_.Error(where, WithDetail(finding));
+      else
+        log_.Warning(where, WithDetail(finding));
+      isFaulty = isFaulty || finding.severity == Severity::Error;
+    }
+    // A period that is not covered is a warning to who edits, and an end to who computes.
+    const auto* file = dynamic_cast<const DataFileNode*>(&place.node);
+    if (isFaulty || !file || !file->FileUsed) return;
+    const std::string problem = WhyNotMet(file->File.Absolute(), file->Items, file->SelectionRequest());
+    if (!problem.empty()) log_.Error(place.path + ":FILE_NAME", problem);
+  });
+  return log_.Errors() == 0;
+}
+
+bool Preprocessor::MakeResultFolder() {
+  const std::string folder(FolderOf(grids_.Path()));
+  std::error_code error;
+  std::filesystem::create_directories(NativePath(folder), error);
+  if (error) log_.Error({}, fmt::format("cannot make the folder of the results, {}: {}", folder, error.message()));
+  return !error;
+}
+
+bool Preprocessor::MakeDomain() {
+  std::string problem = "the setup has no domain";
+  if (catchment_) domain_ = catchment_->GetDomainGrid(&problem);
+  if (!domain_) log_.Error(catchment_ ? PathOf(*catchment_) : std::string(), problem);
+  return domain_ != nullptr;
+}
+
+// ---- Pages
+
+void Preprocessor::AddPagesBelow(CYbSEKvfBase& node, ReportPage& parent) {
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
+    if (!child->IsDataUsedInSetup()) continue;
+    ReportPage page;
+    page.title = child->GetTitle();
+    const bool isFilled = FillPage(*child, page);
+    AddPagesBelow(*child, page);
+    if (isFilled || !page.pages.empty()) parent.pages.push_back(std::move(page));
+  }
+}
+
+bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
+  if (&node == catchment_) {
+    ShowDomain(page);
+  } else if (auto* quantity = dynamic_cast<CData2DKvf*>(&node)) {
+    ShowQuantity(*quantity, page);
+  } else if (auto* zones = dynamic_cast<CodedZonesKvf*>(&node)) {
+    ShowZones(*zones, page);
+  } else if (auto* forcing = dynamic_cast<C2DStationBasedDataKvf*>(&node)) {
+    ShowForcing(*forcing, page);
+  } else if (const auto* station = dynamic_cast<const C2DStationBasedDataTimeSeriesKvf*>(&node)) {
+    page.title = station->GetStationName();
+    const auto* owner = dynamic_cast<const C2DStationBasedDataKvf*>(station->GetParent());
+    ShowSeries(station->TYPE == C2DStationBasedDataTimeSeriesKvf::kConstant, station->FIXED_VALUE,
+               owner ? owner->GetItemType() : kUndefinedItemType, station->SeriesFile(), page);
+  } else if (const auto* series = dynamic_cast<const CTimeseriesConstKvf*>(&node)) {
+    const CGlobalKvf& global = series->Global();
+    ShowSeries(global.TYPE == CGlobalKvf::kConstant, global.FIXED_VALUE, series->GetItemType(), global.SeriesFile(),
+               page);
+  } else {
+    return false;
+  }
+  return true;
+}
+
+void Preprocessor::ShowGrid(ModelGrid grid, ReportPage& page) {
+  page.ShowGrid(grids_.Path(), grids_.Add(std::move(grid)));
+}
+
+void Preprocessor::ShowDomain(ReportPage& page) {
+  const auto copy = [this](CTvn2DOrthoRotatedGridData& grid) {
+    grid = *domain_;
+    return FileResult{};
+  };
+  const auto nameOfCode = [](int code) { return std::string(code == 2 ? "outer boundary" : "inside"); };
+  ShowGrid({page.title, PathOf(*catchment_), kCodeItemType, copy, nameOfCode, {}, {}}, page);
+
+  CGeoDataBoundCondCatchmentData boundary;
+  std::string problem = boundary.TakeValues(domain_->Geometry(), domain_->Values(), domain_->DeleteValue(),
+                                            domain_->ItemUnit(), domain_->ItemType());
+  if (problem.empty() && boundary.PrepareBoundary(problem)) {
+    ReportPage& child = page.pages.emplace_back();
+    child.title = "Outer Boundary";
+    child.ShowText(fmt::format(
+        "The outer boundary has {} cells. It begins at column {}, row {} from the south and runs clockwise.",
+        boundary.BoundaryCells.size(), boundary.StartCell.i + 1, boundary.StartCell.j + 1));
+  } else {
+    log_.Warning(PathOf(*catchment_), "the outer boundary cannot be traced" + (problem.empty() ? "" : ": " + problem));
+  }
+}
+
+void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
+  const GridSource source = quantity.CurrentSource();
+  const int itemType = quantity.GetItemType();
+  auto make = [source, itemType, value = quantity.FixedValue,
+               geometry = domain_->Geometry()](CTvn2DOrthoRotatedGridData& grid) -> FileResult {
+    if (source.type == CData2DKvf::kUniform) {
+      const ItemType* type = FindItemType(itemType);
+      const int unit = type ? BaseUnit(*type).key : kDimensionlessUnit;
+      return {grid.SetGridData(geometry, value, kUsualDeleteValue, unit, itemType), {}};
+    }
+    InterpolationOptions work;
+    work.threads = kThreads;
+    return BuildGrid(source, work, grid);
+  };
+  ShowGrid({page.title, PathOf(quantity), itemType, std::move(make), {}, {}, {}}, page);
+  if (&quantity != document_.Root().GetImportantNode("TOPOGRAPHY")) return;
+  report_.topographyFile = grids_.Path();
+  report_.topographyItem = static_cast<int>(grids_.Grids().size());
+}
+
+void Preprocessor::ShowZones(CodedZonesKvf& zones, ReportPage& page) {
+  ZoneSource source;
+  if (zones.UsesGridCodes()) {
+    source.gridFile = zones.GridFile().File.Absolute();
+    source.item = zones.GridFile().SelectedItem();
+  } else if (zones.UsesPolygons()) {
+    source.polygons = {zones.ShapeFile().File.Absolute(), zones.ShapeFile().Attribute(), zones.ShapeGapFillName,
+                       zones.ShapeAxisUnit};
+  } else {
+    return page.ShowText("One zone for the whole area.");
+  }
+  ShowZoneMap(zones, source, page);
+}
+
+void Preprocessor::ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page) {
+  const CGlobalKvf& global = forcing.Global();
+  const CStationBasedKvf& stations = forcing.Stations();
+  ZoneSource source;
+  switch (forcing.DistributionType) {
+    case C2DStationBasedDataKvf::kStationBased:
+      if (forcing.UsesGridCodes()) {
+        source.gridFile = stations.GridFile().File.Absolute();
+        source.item = stations.GridFile().SelectedItem();
+      } else {
+        source.polygons = {stations.ShapeFile().File.Absolute(), stations.ShapeFile().Attribute(),
+                           stations.ShapeGapFillName, stations.ShapeAxisUnit};
+      }
+      return ShowZoneMap(forcing, source, page);
+    case C2DStationBasedDataKvf::kFullyDistributed: {
+      const CFMData2DNdsFile& file = forcing.FullyDistributed().GridFile();
+      auto make = [path = file.File.Absolute(), item = file.SelectedItem(), start = period_->GetSimStartDate(),
+                   end = period_->SIMEND](CTvn2DOrthoRotatedGridData& grid) {
+        return MeanOfSteps(path, item, start, end, grid);
+      };
+      page.title += ", mean of the time steps";
+      return ShowGrid({page.title, PathOf(file), forcing.GetItemType(), std::move(make), {}, {}, {}}, page);
+    }
+    default:
+      return ShowSeries(global.TYPE == CGlobalKvf::kConstant, global.FIXED_VALUE, forcing.GetItemType(),
+                        global.SeriesFile(), page);
+  }
+}
+
+void Preprocessor::ShowSeries(bool isConstant, float value, int itemType, const CFMData0DFile& file, ReportPage& page) {
+  if (isConstant)
+    page.ShowText(fmt::format("{}, constant", WithUnit(static_cast<double>(value), itemType)));
+  else
+    page.ShowSeries(file.File.Absolute(), file.SelectedItem(), period_->GetSimStartDate(), period_->SIMEND);
+}
+
+void Preprocessor::ShowZoneMap(CFMSEKvfBase& owner, const ZoneSource& source, ReportPage& page) {
+  const auto table = std::make_shared<ZoneTable>();
+  auto make = [source, table, geometry = domain_->Geometry()](CTvn2DOrthoRotatedGridData& grid) {
+    if (!source.gridFile.empty()) return ReadGridData(source.gridFile, source.item, grid);
+    return grid.CreateGridData_GIS_Polygon(geometry, kUsualDeleteValue, source.polygons, *table);
+  };
+  auto nameOfCode = [&owner, table](int code) -> std::string {
+    std::string id = std::to_string(code);
+    for (const ZoneTable::Zone& zone : table->zones)
+      if (zone.code == code) id = zone.text;
+    for (const CFMSEKvfGroupBase* item : ZoneItems(owner))
+      if (item->GetStationId() == id) return item->GetStationName();
+    return id;
+  };
+  ShowGrid({page.title, PathOf(owner), kCodeItemType, std::move(make), std::move(nameOfCode), {}, {}}, page);
+}
+
+// ---- Summary
+
+std::string Preprocessor::SummaryText() const {
+  const GridGeometry& geometry = domain_->Geometry();
+  const double cellArea = geometry.cellSize * geometry.cellSize / 1e6;
+  std::string text = fmt::format("Preprocessed from {}\n\n", FileNameOf(document_.PathName()));
+  text += fmt::format("Simulation period: {} to {}\n", DateInWords(period_->GetSimStartDate()),
+                      DateInWords(period_->SIMEND));
+  text += fmt::format("Model grid: {} x {} cells of {} m\n", geometry.nx, geometry.ny, geometry.cellSize);
+  text += "\nQuantities on the model grid\n";
+  for (const ModelGrid& grid : grids_.Grids()) {
+    if (grid.values.count == 0) {
+      text += fmt::format("{}: no values\n", grid.title);
+    } else if (grid.nameOfCode) {
+      const double cells = static_cast<double>(grid.values.count);
+      text += fmt::format("{}: {:.6g} km2 in {} cells\n", grid.title, cells * cellArea, grid.values.count);
+      for (const auto& [code, count] : grid.cellsOfCode)
+        text +=
+            fmt::format("    {}, {}: {:.6g} km2\n", code, grid.nameOfCode(code), static_cast<double>(count) * cellArea);
+    } else {
+      text += fmt::format("{}: {} to {}, mean {}\n", grid.title,
+                          WithUnit(static_cast<double>(grid.values.smallest), grid.itemType),
+                          WithUnit(static_cast<double>(grid.values.largest), grid.itemType),
+                          WithUnit(grid.values.Mean(), grid.itemType));
+    }
+  }
+  text += log_.Warnings().empty() ? "\nNo warnings." : "\nWarnings\n";
+  for (const std::string& warning : log_.Warnings()) text += warning + "\n";
+  return text;
+}
+
+}  // namespace tervane

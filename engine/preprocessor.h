@@ -1,0 +1,73 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "document/flow_model_document.h"
+#include "engine/engine_log.h"
+#include "engine/model_grids.h"
+#include "engine/report.h"
+#include "platform/grid.h"
+#include "platform/grid_polygons.h"
+
+namespace tervane {
+
+class C2DStationBasedDataKvf;
+class CCatchmentKvf;
+class CData2DKvf;
+class CSimPeriodKvf;
+class CFMData0DFile;
+class CFMSEKvfBase;
+class CodedZonesKvf;
+
+/// Where the areas of zones or stations come from.
+struct ZoneSource {
+  std::string gridFile;  ///< Of codes; empty for polygons.
+  int item = 1;
+  PolygonFile polygons;
+};
+
+/// Puts everything that varies over the model area on the cells of the model, and reports what it made as a tree of
+/// pages that mirrors the setup's. A kind of node is known here by its family alone, so that a new member of a family
+/// needs nothing.
+class Preprocessor {
+ public:
+  Preprocessor(CFlowModelDoc& document, EngineLog& log);
+
+  /// Leaves grids and report in the setup's result folder. False when something in use cannot be used, which the log
+  /// tells; then the report of an earlier run stands.
+  bool Run();
+
+ private:
+  bool CheckSetup();
+  bool MakeResultFolder();
+  bool MakeDomain();
+
+  /// Adds pages for what is below a node and takes part.
+  void AddPagesBelow(CYbSEKvfBase& node, ReportPage& parent);
+  /// Sets what the page of a node shows; false for a node that has nothing to show by itself.
+  bool FillPage(CYbSEKvfBase& node, ReportPage& page);
+  void ShowDomain(ReportPage& page);
+  void ShowQuantity(CData2DKvf& quantity, ReportPage& page);
+  void ShowZones(CodedZonesKvf& zones, ReportPage& page);
+  void ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page);
+  /// A constant as text, or a series.
+  void ShowSeries(bool isConstant, float value, int itemType, const CFMData0DFile& file, ReportPage& page);
+  /// A map of the codes of zones or stations.
+  void ShowZoneMap(CFMSEKvfBase& owner, const ZoneSource& source, ReportPage& page);
+  void ShowGrid(ModelGrid grid, ReportPage& page);
+  std::string SummaryText() const;
+
+  CFlowModelDoc& document_;
+  EngineLog& log_;
+  const CCatchmentKvf* catchment_;
+  const CSimPeriodKvf* period_;
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> domain_;
+  ModelGridFile grids_;
+  Report report_;
+};
+
+}  // namespace tervane

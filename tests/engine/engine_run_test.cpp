@@ -1,0 +1,151 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "engine/engine_run.h"
+
+#include <sstream>
+
+#include <gmock/gmock.h>
+
+#include "core/kvf.h"
+#include "execution/execute_flags.h"
+#include "platform/grid_files.h"
+#include "simspec/model_components.h"
+#include "spatial/data2d.h"
+#include "spatial/domain.h"
+#include "spatial/zones.h"
+#include "tests/support/setup.h"
+#include "tests/support/temp_folder.h"
+
+namespace tervane {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::Not;
+
+constexpr float kEmpty = kUsualDeleteValue;
+
+/// A setup of 4 by 4 cells of 100 m at (1000, 2000); the domain leaves the two northern corners out.
+class EngineRun : public testing::Test {
+ protected:
+  EngineRun() {
+    WriteGrid("domain.nds2", {4, 4, 100, 1000, 2000, 0, {}}, {2, 2, 2, 2, 2, 1, 1, 2, 2, 1, 1, 2, kEmpty, 2, 2, kEmpty},
+              kCodeItemType);
+    Domain().GridFile().Choose(FileName("domain.nds2", folder.Path()));
+    Domain().Type = CCatchmentKvf::kGridFile;
+  }
+  void WriteGrid(const std::string& name, const GridGeometry& geometry, std::vector<float> values, int itemType) {
+    CTvn2DOrthoRotatedGridData grid;
+    ASSERT_EQ(grid.TakeValues(geometry, std::move(values), kEmpty, 0, itemType), "");
+    ASSERT_EQ(WriteGridData(folder.File(name), grid).error, "");
+  }
+  CCatchmentKvf& Domain() { return *document.Root().Important<CCatchmentKvf>("CATCHMENT"); }
+  CTopographyKvf& Topography() { return *document.Root().Important<CTopographyKvf>("TOPOGRAPHY"); }
+
+  EngineStatus Run(const std::string& option) {
+    EXPECT_TRUE(document.OnSaveDocument(folder.File("a.tvd"))) << document.Error();
+    std::ostringstream out;
+    std::vector<std::string> arguments{folder.File("a.tvd")};
+    if (!option.empty()) arguments.push_back(option);
+    const EngineStatus status = RunEngine(arguments, out);
+    log = out.str();
+    return status;
+  }
+  std::string ReportPath() const { return folder.File("a_results/a_PreProcessed.kvf"); }
+  /// The values of an item of the grids that a run left.
+  std::vector<float> Values(int item) {
+    CTvn2DOrthoRotatedGridData grid;
+    const FileResult result = ReadGridData(folder.File("a_results/a_PreProcessed.nds2"), item, grid);
+    EXPECT_TRUE(result.Ok()) << result.error;
+    return grid.Values();
+  }
+
+  test::TempFolder folder;
+  CFlowModelDoc document;
+  std::string log;
+};
+
+TEST_F(EngineRun, PutsQuantitiesOnTheCellsOfTheDomain) {
+  // Half the cell size, so that a model cell's centre is a corner of four; the plane rises by 1 a metre to the east.
+  std::vector<float> plane;
+  for (int j = 0; j < 8; ++j)
+    for (int i = 0; i < 8; ++i) plane.push_back(static_cast<float>(50 * i + 25));
+  WriteGrid("dem.nds2", {8, 8, 50, 1000, 2000, 0, {}}, plane, 100180);
+  Topography().Type = CData2DKvf::kGridFile;
+  Topography().GridFile().Choose(FileName("dem.nds2", folder.Path()));
+
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(Values(2),
+              ElementsAre(50, 150, 250, 350, 50, 150, 250, 350, 50, 150, 250, 350, kEmpty, 150, 250, kEmpty));
+  EXPECT_THAT(log, Not(HasSubstr("warning")));
+
+  KvfFile* report = kvfLoadFile(ReportPath(), 1);
+  KvfNode* top = kvfSectionByNameNum(kvfTargetByNameNum(report, "PreProcessed_Data", 1), "PAGE", 1);
+  std::string text, file;
+  kvfGetParam(kvfSectionByNameNum(top, "TEXT", 1), "Text", &text, 1, 1);
+  EXPECT_THAT(text, HasSubstr("0.14 km2 in 14 cells"));
+  EXPECT_THAT(text, HasSubstr("Topography: 50 m to 350 m"));
+  KvfNode* page = kvfSectionByNameNum(kvfSectionByNameNum(top, "PAGE", 2), "NDS2_PLOT", 1);
+  kvfGetParamFilename(page, "Filename", &file, 1, 1);
+  EXPECT_EQ(file, folder.File("a_results/a_PreProcessed.nds2"));
+  int item = 0;
+  kvfGetParam(kvfSectionByNameNum(kvfTargetByNameNum(report, "Extra_Data", 1), "Topography", 1), "ItemNo", &item, 1, 1);
+  EXPECT_EQ(item, 2);
+  kvfClose(&report);
+}
+
+TEST_F(EngineRun, TellsCellsWithoutValueAndZonesByName) {
+  WriteGrid("codes.nds2", {2, 4, 100, 1000, 2000, 0, {}}, {5, 5, 5, 5, 8, 8, 8, 8}, kCodeItemType);
+  document.Root().Important<CModelCompKvf>("MODELCOMP")->OL_ModelType = 1;
+  auto& zones = *document.Root().Important<CSubcatchmentKvf>("SUBCATCHMENT");
+  zones.GridFile().Choose(FileName("codes.nds2", folder.Path()));
+  zones.Type = CodedZonesKvf::kGridCodes;
+  ASSERT_EQ(zones.SyncZones(), kAdded);
+  zones.SelectZoneByCode(8)->SetStationName("Upper valley");
+
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(log, HasSubstr("warning: Subcatchments: 7 cells of the domain have no Subcatchments"));
+  EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("8, Upper valley: 0.03 km2"));
+}
+
+TEST_F(EngineRun, RefusesWhatItCannotDo) {
+  auto& flags = *document.Root().Important<CExecuteEngineFlagsKvf>("EXECUTE_ENGINE_FLAGS");
+  struct Case {
+    const char* what;
+    std::function<void()> prepare;
+    const char* option;
+    const char* message;
+    bool leavesReport;
+  };
+  const Case cases[] = {
+      {"water movement", [] {}, "/WM", "there is no water movement simulation", false},
+      {"water quality", [] {}, "/WQ", "there is no water quality simulation", false},
+      {"what the file says", [] {}, "", "simulates no water: there is no water movement simulation; the prepro", true},
+      {"preprocessing alone", [&] { flags.WM = 0; }, "", "progress 100 Done", true},
+      {"an unknown option", [] {}, "/XX", "usage:", false},
+      {"a missing file",
+       [&] {
+         Topography().Type = CData2DKvf::kGridFile;
+         Topography().GridFile().Choose(FileName("away.nds2", folder.Path()));
+       },
+       "/PP", "error: Topography/NDS_2D_DATA_FILE", false},
+      {"a missing file that no validation reads",
+       [&] {
+         Topography().Type = CData2DKvf::kXyzFile;
+         Topography().XyzFile().File = FileName("away.txt", folder.Path());
+       },
+       "/PP", "error: Topography: ", false},
+  };
+  for (const Case& test : cases) {
+    SCOPED_TRACE(test.what);
+    std::filesystem::remove(ReportPath());
+    test.prepare();
+    const EngineStatus status = Run(test.option);
+    EXPECT_THAT(log, HasSubstr(test.message));
+    EXPECT_EQ(status == kEngineDone, std::string_view(test.message).starts_with("progress 100"));
+    EXPECT_EQ(FileExists(ReportPath()), test.leavesReport);
+  }
+}
+
+}  // namespace
+}  // namespace tervane
