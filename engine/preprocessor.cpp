@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "engine/preprocessor.h"
 
+#include <algorithm>
 #include <filesystem>
 #include <utility>
 
@@ -40,6 +41,15 @@ std::string WithUnit(double value, int itemType) {
   const std::string number = FormatQuantity(value, *type, BaseUnit(*type).key);
   const std::string_view unit = BaseUnit(*type).abbreviation;
   return unit.empty() ? number : fmt::format("{} {}", number, unit);
+}
+
+/// The identity of the zone or station of that title, "" without one: setups hold the title of what fills gaps.
+std::string IdOfTitle(const CFMSEKvfBase& owner, const std::string& title) {
+  const std::vector<CFMSEKvfGroupBase*> items = ZoneItems(owner);
+  const std::vector<std::string> titles = ZoneItemTitles(owner);
+  const auto found = std::ranges::find(titles, title);
+  return found == titles.end() ? std::string()
+                               : items[static_cast<std::size_t>(found - titles.begin())]->GetStationId();
 }
 
 /// The mean of the steps of a file of grids that end within a period, or of all steps where the file has no dates.
@@ -222,8 +232,8 @@ void Preprocessor::ShowZones(CodedZonesKvf& zones, ReportPage& page) {
     source.gridFile = zones.GridFile().File.Absolute();
     source.item = zones.GridFile().SelectedItem();
   } else if (zones.UsesPolygons()) {
-    source.polygons = {zones.ShapeFile().File.Absolute(), zones.ShapeFile().Attribute(), zones.ShapeGapFillName,
-                       zones.ShapeAxisUnit};
+    source.polygons = {zones.ShapeFile().File.Absolute(), zones.ShapeFile().Attribute(),
+                       IdOfTitle(zones, zones.ShapeGapFillName), zones.ShapeAxisUnit};
   } else {
     return page.ShowText("One zone for the whole area.");
   }
@@ -241,7 +251,7 @@ void Preprocessor::ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page
         source.item = stations.GridFile().SelectedItem();
       } else {
         source.polygons = {stations.ShapeFile().File.Absolute(), stations.ShapeFile().Attribute(),
-                           stations.ShapeGapFillName, stations.ShapeAxisUnit};
+                           IdOfTitle(forcing, stations.ShapeGapFillName), stations.ShapeAxisUnit};
       }
       return ShowZoneMap(forcing, source, page);
     case C2DStationBasedDataKvf::kFullyDistributed: {

@@ -66,7 +66,7 @@ section ExtraParams {
 /// The pages of all nodes as text, each under the path of its node.
 std::string AllPages(CFlowModelDoc& document) {
   std::string text;
-  test::NoQuestions host;
+  test::ScriptedHost host;
   WalkNodes(document.Root(), [&](const NodePlace& place) {
     const PageClass* pageClass = place.node.GetDlgRuntimeClass(kSetupDataTree);
     // Help pages are texts of their own.
@@ -108,7 +108,7 @@ TEST(PageTable, EveryControlTakesItsOwnText) {
   CFlowModelDoc document;
   ASSERT_TRUE(document.OpenText(FullSetup(), "/data/a.tvd"));
   const std::string before = test::SavedText(document);
-  test::NoQuestions host;
+  test::ScriptedHost host;
   int controls = 0;
   WalkNodes(document.Root(), [&](const NodePlace& place) {
     const PageClass* pageClass = place.node.GetDlgRuntimeClass(kSetupDataTree);

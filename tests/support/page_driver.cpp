@@ -14,13 +14,28 @@ namespace {
 
 }  // namespace
 
-Host::Answer NoQuestions::Ask(const std::string& text, Icon, Buttons) { Unexpected(text); }
-std::optional<std::string> NoQuestions::AskFileToOpen(const FileQuestion& question) { Unexpected(question.title); }
-std::optional<std::string> NoQuestions::AskFileToSave(const FileQuestion& question) { Unexpected(question.title); }
-std::optional<int> NoQuestions::AskItem(const ItemQuestion& question) { Unexpected(question.title); }
-void NoQuestions::OpenBrowser(const std::string& address) { Unexpected(address); }
-std::string NoQuestions::Setting(const std::string&) const { return {}; }
-void NoQuestions::SetSetting(const std::string& name, const std::string&) { Unexpected(name); }
+template <class Expected>
+Expected ScriptedHost::Next(const std::string& question) {
+  if (script_.empty() || question.find(script_.front().first) == std::string::npos) Unexpected(question);
+  Expected reply = std::get<Expected>(script_.front().second);
+  script_.pop_front();
+  return reply;
+}
+
+Host::Answer ScriptedHost::Ask(const std::string& text, Icon, Buttons) { return Next<Answer>(text); }
+std::optional<std::string> ScriptedHost::AskFileToOpen(const FileQuestion& question) {
+  return Next<std::optional<std::string>>(question.title);
+}
+std::optional<std::string> ScriptedHost::AskFileToSave(const FileQuestion& question) {
+  return Next<std::optional<std::string>>(question.title);
+}
+std::optional<int> ScriptedHost::AskItem(const ItemQuestion& question) {
+  items_ = question;
+  return Next<std::optional<int>>(question.title);
+}
+void ScriptedHost::OpenBrowser(const std::string& address) { Unexpected(address); }
+std::string ScriptedHost::Setting(const std::string&) const { return {}; }
+void ScriptedHost::SetSetting(const std::string& name, const std::string&) { Unexpected(name); }
 
 PageDriver::PageDriver(CFlowModelDoc& document, std::string_view path) {
   CYbSEKvfBase* node = FindNode(document.Root(), ParseSetupPath(path).steps);

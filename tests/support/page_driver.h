@@ -2,9 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <deque>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
+#include <variant>
 #include <vector>
 
 #include "document/flow_model_document.h"
@@ -12,9 +16,18 @@
 
 namespace tervane::test {
 
-/// A host that answers nothing; a question fails the test.
-class NoQuestions : public Host {
+/// A host that answers by a script, question after question; one that the script does not have fails the test.
+class ScriptedHost : public Host {
  public:
+  using Reply = std::variant<Answer, std::optional<std::string>, std::optional<int>>;
+
+  /// The next question holds `part` in its text or title.
+  void Expect(std::string part, Reply reply) { script_.push_back({std::move(part), std::move(reply)}); }
+  /// Whether all was asked.
+  bool IsDone() const { return script_.empty(); }
+  /// What was shown by the latest question for an item.
+  const ItemQuestion& Items() const { return items_; }
+
   Answer Ask(const std::string& text, Icon icon, Buttons buttons) override;
   std::optional<std::string> AskFileToOpen(const FileQuestion& question) override;
   std::optional<std::string> AskFileToSave(const FileQuestion& question) override;
@@ -22,6 +35,13 @@ class NoQuestions : public Host {
   void OpenBrowser(const std::string& address) override;
   std::string Setting(const std::string& name) const override;
   void SetSetting(const std::string& name, const std::string& value) override;
+
+ private:
+  template <class Expected>
+  Expected Next(const std::string& question);
+
+  std::deque<std::pair<std::string, Reply>> script_;
+  ItemQuestion items_;
 };
 
 /// The page of a node of a setup, driven by its labels.
@@ -30,6 +50,7 @@ class PageDriver {
   PageDriver(CFlowModelDoc& document, std::string_view path);
 
   CYbSEDlgBase& Page() { return *page_; }
+  ScriptedHost& Outside() { return host_; }
   /// The control with that label; of controls without one, the one of that key. One that is not there fails the test.
   Control& Find(std::string_view label);
   /// Types a value; gives what was expected when it is refused.
@@ -40,7 +61,7 @@ class PageDriver {
   const std::vector<std::string>& Changes() const { return changes_; }
 
  private:
-  NoQuestions host_;
+  ScriptedHost host_;
   std::vector<std::string> changes_;
   std::unique_ptr<CYbSEDlgBase> page_;
 };

@@ -1,0 +1,82 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/spatial/zone_pages.h"
+
+#include <gmock/gmock.h>
+
+#include "platform/grid_files.h"
+#include "simspec/model_components.h"
+#include "tests/support/page_driver.h"
+#include "tests/support/setup.h"
+#include "tests/support/temp_folder.h"
+
+namespace tervane {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+
+using Path = std::optional<std::string>;
+using Row = std::optional<int>;
+
+class ZonePage : public testing::Test {
+ protected:
+  void WriteGrid(const std::string& name, std::vector<float> values, int itemType) {
+    CTvn2DOrthoRotatedGridData grid;
+    ASSERT_EQ(grid.TakeValues({2, 1, 100, 0, 0, 0, {}}, std::move(values), kUsualDeleteValue, 0, itemType), "");
+    ASSERT_EQ(WriteGridData(folder.File(name), grid).error, "");
+  }
+  std::vector<std::string> Titles() { return zones.GetZoneTitles(); }
+
+  test::TempFolder folder;
+  CFlowModelDoc document;
+  CSubcatchmentKvf& zones = *document.Root().Important<CSubcatchmentKvf>("SUBCATCHMENT");
+};
+
+TEST_F(ZonePage, ASelectorTakesCodesAndRefusesOtherQuantitiesWithTheReason) {
+  WriteGrid("codes.nds2", {1, 2}, kCodeItemType);
+  WriteGrid("dem.nds2", {1, 2}, 100180);
+  test::PageDriver page(document, "Subcatchments");
+  page.Outside().Expect("", Path(folder.File("dem.nds2")));
+  page.Outside().Expect("Choose an item", Row());
+  page.Page().Browse(page.Find("Grid Distribution File:"));
+  ASSERT_EQ(page.Outside().Items().rows.size(), 1U);
+  EXPECT_THAT(page.Outside().Items().rows[0].refusal, HasSubstr("is Elevation"));
+  EXPECT_EQ(page.Outside().Items().current, -1);
+  EXPECT_TRUE(zones.GridFile().File.IsEmpty());
+
+  page.Outside().Expect("", Path(folder.File("codes.nds2")));
+  page.Outside().Expect("Choose an item", Row(0));
+  page.Page().Browse(page.Find("Grid Distribution File:"));
+  EXPECT_EQ(page.Outside().Items().rows[0].refusal, "");
+  EXPECT_THAT(Titles(), ElementsAre("Grid code = 1", "Grid code = 2"));
+
+  page.Outside().Expect("", Path(folder.Write("text.nds2", "no data file")));
+  page.Outside().Expect("text.nds2", Host::Answer::Ok);
+  page.Page().Browse(page.Find("Grid Distribution File:"));
+  EXPECT_TRUE(page.Outside().IsDone());
+}
+
+TEST_F(ZonePage, ZonesThatHoldWorkGoOnlyWhenTheUserSaysSo) {
+  WriteGrid("codes.nds2", {1, 2}, kCodeItemType);
+  WriteGrid("others.nds2", {2, 3}, kCodeItemType);
+  test::PageDriver page(document, "Subcatchments");
+  ASSERT_EQ(page.Enter("Grid Distribution File:", folder.File("codes.nds2")), "");
+  zones.SelectZoneByCode(1)->SetStationName("Upper valley");
+
+  page.Outside().Expect("would be removed:\n\nUpper valley\n", Host::Answer::No);
+  page.Enter("Grid Distribution File:", folder.File("others.nds2"));
+  EXPECT_THAT(Titles(), ElementsAre("Upper valley", "Grid code = 2"));
+
+  page.Outside().Expect("The zones stay as they are.", Host::Answer::Ok);
+  page.Enter("Grid Distribution File:", folder.File("away.nds2"));
+  EXPECT_THAT(Titles(), ElementsAre("Upper valley", "Grid code = 2"));
+
+  page.Outside().Expect("would be removed:", Host::Answer::Yes);
+  page.Enter("Grid Distribution File:", folder.File("others.nds2"));
+  EXPECT_THAT(Titles(), ElementsAre("Grid code = 2", "Grid code = 3"));
+  EXPECT_TRUE(page.Outside().IsDone());
+}
+
+}  // namespace
+}  // namespace tervane
