@@ -132,6 +132,14 @@ void CYbSEKvfBase::Load(KvfNode* parentSection) {
   LoadChildren(section);
 }
 
+void CYbSEKvfBase::LoadRenamed(int lastVersion, std::string oldName, KvfNode* parentSection) {
+  const bool isOld = (root_ ? root_->ReadDocVersion() : -1) <= lastVersion;
+  std::string name = sectionName_;
+  if (isOld) sectionName_ = std::move(oldName);
+  CYbSEKvfBase::Load(parentSection);
+  sectionName_ = std::move(name);
+}
+
 void CYbSEKvfBase::ReadTouched(KvfNode* section) {
   kvfGetParam(section, "Touched", &touched_, 1, 1);
   // Computed anew at every save.

@@ -185,6 +185,8 @@ class CYbSEKvfBase {
   void SectionName(std::string name) { sectionName_ = std::move(name); }
   /// The node's section in the parent's section, marked as looked up; null when there is none.
   KvfNode* FindSection(KvfNode* parentSection) const;
+  /// Loads a node whose section bore another name in documents up to that version.
+  void LoadRenamed(int lastVersion, std::string oldName, KvfNode* parentSection);
   void LoadChildren(KvfNode* section);
   void SaveChildren(KvfFile* file);
   CYbSEKvfBase* ImportantNode(std::string_view name) const;

@@ -19,6 +19,7 @@
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
+#include "surface/climate.h"
 
 namespace tervane {
 
@@ -46,6 +47,8 @@ constexpr std::array kChildren{
     ChildRow{Make<CCatchmentKvf>, "CATCHMENT"},
     ChildRow{Make<CSubcatchmentKvf>, "SUBCATCHMENT"},
     ChildRow{Make<CTopographyKvf>, "TOPOGRAPHY"},
+    ChildRow{Make<CPrecipitationRelatedKvf>, "PRECIPITATIONRELATED"},
+    ChildRow{Make<CEvapotransKvf>, "Evapotrans"},
     ChildRow{Make<CDummySatZoneKvf>, ""},
     ChildRow{Make<CExtraParamsKvf>, ""},
     ChildRow{Make<CExecuteEngineFlagsKvf>, "EXECUTE_ENGINE_FLAGS"},

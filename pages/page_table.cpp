@@ -15,8 +15,10 @@
 #include "pages/spatial/domain_pages.h"
 #include "pages/spatial/station_pages.h"
 #include "pages/spatial/zone_pages.h"
+#include "pages/surface/climate_pages.h"
 #include "simspec/pages.h"
 #include "spatial/pages.h"
+#include "surface/pages.h"
 
 namespace tervane {
 
@@ -45,6 +47,14 @@ const std::array kPages{
     PageRow{kRiverLinksPage, Make<CSubcatchmentRiverLinksDlg, CSubcatchmentRiverlinksListKvf>},
     PageRow{kStationBasedDataPage, Make<C2DStationBasedDataDlg, C2DStationBasedDataKvf>},
     PageRow{kStationPage, Make<C2DStationBaseDataTimeSeriesDlg, C2DStationBasedDataTimeSeriesKvf>},
+    PageRow{kClimatePage, Make<CPrecipitationRelatedDlg, CPrecipitationRelatedKvf>},
+    PageRow{kPrecipitationPage, Make<C2DStationBasedDataDlg, C2DStationBasedDataKvf>},
+    PageRow{kPrecipitationStationPage, Make<C2DStationBaseDataTimeSeriesDlg, C2DStationBasedDataTimeSeriesKvf>},
+    PageRow{kPotEvapTransPage, Make<C2DStationBasedDataDlg, C2DStationBasedDataKvf>},
+    PageRow{kPotEvapTransStationPage, Make<C2DStationBaseDataTimeSeriesDlg, C2DStationBasedDataTimeSeriesKvf>},
+    PageRow{kAirTemperaturePage, Make<C2DStationBasedDataDlg, C2DStationBasedDataKvf>},
+    PageRow{kAirTemperatureStationPage, Make<C2DStationBaseDataTimeSeriesDlg, C2DStationBasedDataTimeSeriesKvf>},
+    PageRow{kSnowMeltPage, Make<CSnowmeltConstDlg, CSnowmeltConstKvf>},
     PageRow{kTimeseriesConstPage, Make<CTimeseriesConstDlg, CTimeseriesConstKvf>},
     PageRow{kBasicParaPage, Make<CBasicParaDlg, CBasicParaKvf>},
     PageRow{kModelCompWQPage, Make<CModelCompWQDlg, CModelCompWQKvf>},

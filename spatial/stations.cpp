@@ -3,6 +3,7 @@
 #include "spatial/stations.h"
 
 #include <algorithm>
+#include <unordered_set>
 
 #include "core/list.h"
 #include "platform/units.h"
@@ -12,9 +13,7 @@ namespace tervane {
 
 namespace {
 
-constexpr int kPrecipitationRate = 100004;  ///< What a file of any forcing may hold besides its own quantity.
-// Kinds of value: means over a step, and sums over it.
-constexpr int kMeanStepAccumulated = 3, kStepAccumulated = 2;
+constexpr int kPrecipitationDepth = 100004;  ///< What a file of any forcing may hold besides its own quantity.
 
 }  // namespace
 
@@ -56,6 +55,8 @@ void CStationBasedKvf::ReadData(KvfNode* section) {
     kvfAddNote(section, "NO_TIMESERIES", count < 0 ? "a negative count is read as 0" : "the count is cut to 1000000");
     count = std::clamp(count, 0, kLargestItemCount);
   }
+  // An old file may hold the forcing in two places: what is read later counts.
+  for (CFMSEKvfGroupBase* station : ZoneItems(owner_)) owner_.RemoveChild(station);
   // The parent is walking its children, and goes on to read these.
   for (int number = 1; number <= count; ++number) owner_.AddChild(owner_.CreateStationItem());
   CTvnKvfBase::ReadData(section);
@@ -74,9 +75,10 @@ void CFullyDistributedKvf::ReadData(KvfNode* section) {
 // ---- Stations
 
 C2DStationBasedDataTimeSeriesKvf::C2DStationBasedDataTimeSeriesKvf(const ForcingKind& kind, CYbSEKvfBase* parent)
-    : CFMSEKvfGroupBase("2D Station Based Data", "TIME_SERIES_%d", parent),
+    : CFMSEKvfGroupBase(kind.stationTitle, "TIME_SERIES_%d", parent),
+      hasElevation_(!kind.correctable.empty()),
       file_(NewChild<CFMData0DFile>("TIME_SERIES_FILE")) {
-  SetPage(kStationPage);
+  SetPage(*kind.stationPage);
   SetAbbreviatedTitle(NAME);
   file_->SetMultiItemTypes(kind.itemTypes);
 }
@@ -87,12 +89,12 @@ void C2DStationBasedDataTimeSeriesKvf::ExchangeKeys(KeyExchange& keys) {
   keys.WriteOnly("GRIDCODE", StationCode());
   keys("FIXED_VALUE", FIXED_VALUE);
   keys.FromOne("TYPE", TYPE);
+  if (hasElevation_) keys("Elevation", Elevation);
 }
 
 void C2DStationBasedDataTimeSeriesKvf::ReadData(KvfNode* section) {
   CFMSEKvfGroupBase::ReadData(section);
   SetAbbreviatedTitle(NAME);
-  if (GetParent()) SetTitle(GetParent()->GetTitle());
 }
 
 int C2DStationBasedDataTimeSeriesKvf::GetNumberWhatAmI() const {
@@ -121,21 +123,33 @@ int C2DStationBasedDataTimeSeriesKvf::ValidateData() {
 
 C2DStationBasedDataKvf::C2DStationBasedDataKvf(int itemType, std::string title, std::string section,
                                                CYbSEKvfBase* parent)
+    : C2DStationBasedDataKvf({.itemTypes = {itemType, kPrecipitationDepth},
+                              .valueTypes = kMeansOrSums,
+                              .stationTitle = "2D Station Based Data",
+                              .page = &kStationBasedDataPage,
+                              .stationPage = &kStationPage},
+                             std::move(title), std::move(section), parent) {}
+
+C2DStationBasedDataKvf::C2DStationBasedDataKvf(ForcingKind kind, std::string title, std::string section,
+                                               CYbSEKvfBase* parent)
     : CFMSEKvfBase(std::move(title), std::move(section), parent),
-      kind_{{itemType, kPrecipitationRate}, {kMeanStepAccumulated, kStepAccumulated}},
+      kind_(std::move(kind)),
       global_(NewChild<CGlobalKvf>("Global", "GLOBAL", kind_.itemTypes)) {
   auto stations = std::make_shared<CStationBasedKvf>(this);
   stations_ = stations.get();
   AddChild(std::move(stations));
-  fully_ = NewChild<CFullyDistributedKvf>(itemType);
-  SetPage(kStationBasedDataPage);
-  ValidateData();
+  fully_ = NewChild<CFullyDistributedKvf>(GetItemType());
+  SetPage(*kind_.page);
+  C2DStationBasedDataKvf::ValidateData();
+}
+
+void C2DStationBasedDataKvf::ExchangeKeys(KeyExchange& keys) {
+  keys.FromOne("DistributionType", DistributionType);
+  if (HasElevation()) keys("Elevation", Elevation);
 }
 
 std::shared_ptr<CFMSEKvfGroupBase> C2DStationBasedDataKvf::CreateStationItem() {
-  auto station = std::make_shared<C2DStationBasedDataTimeSeriesKvf>(kind_, this);
-  station->SetTitle(GetTitle());
-  return station;
+  return std::make_shared<C2DStationBasedDataTimeSeriesKvf>(kind_, this);
 }
 
 FoundZones C2DStationBasedDataKvf::FindStations() const {
@@ -148,7 +162,11 @@ FoundZones C2DStationBasedDataKvf::FindStations() const {
 }
 
 SyncResult C2DStationBasedDataKvf::SyncStations(const FoundZones& found) {
+  const std::vector<CFMSEKvfGroupBase*> before = ZoneItems(*this);
+  const std::unordered_set<const CFMSEKvfGroupBase*> known(before.begin(), before.end());
   const SyncResult result = SyncItems(*this, found);
+  for (CFMSEKvfGroupBase* station : ZoneItems(*this))
+    if (!known.contains(station)) station->SetTitle(GetTitle());
   const bool isWithoutFile = (UsesPolygons() && stations_->ShapeFile().File.IsEmpty()) ||
                              (UsesGridCodes() && stations_->GridFile().File.IsEmpty());
   return isWithoutFile ? kRemoved : result;

@@ -9,15 +9,25 @@
 #include <string>
 #include <vector>
 
+#include "platform/datafile.h"
 #include "spatial/file_nodes.h"
 #include "spatial/zone_sync.h"
 
 namespace tervane {
 
-/// What the nodes of one forcing have in common: which quantities and kinds of value its files may hold.
+/// Kinds of value of rates and depths: means over a step, or sums over it.
+inline const std::vector<int> kMeansOrSums{static_cast<int>(ValueType::MeanStep),
+                                           static_cast<int>(ValueType::StepAccumulated)};
+
+/// What makes one forcing differ from the next.
 struct ForcingKind {
-  std::vector<int> itemTypes;   ///< The first is that of values typed on pages.
-  std::vector<int> valueTypes;  ///< Of new files, in the order of preference.
+  std::vector<int> itemTypes;   ///< What its files may hold. The first is that of values typed on pages.
+  std::vector<int> valueTypes;  ///< Of new files, in the order of preference; empty for any.
+  std::string stationTitle;
+  /// What is corrected for elevation, in words; empty for a forcing without elevations.
+  std::string correctable = {};
+  const PageClass* page;
+  const PageClass* stationPage;
 };
 
 /// A constant or a time series.
@@ -92,6 +102,7 @@ class C2DStationBasedDataTimeSeriesKvf : public CFMSEKvfGroupBase {
   std::string GRIDCODEID = "Undefined";  ///< The grid code or the polygon's value.
   float FIXED_VALUE = 0;
   int TYPE = kTimeVarying;
+  float Elevation = 0;  ///< Of the station, quantity 100180; only where the kind has elevations.
 
   CFMData0DFile& SeriesFile() const { return *file_; }
 
@@ -110,20 +121,27 @@ class C2DStationBasedDataTimeSeriesKvf : public CFMSEKvfGroupBase {
   void ExchangeKeys(KeyExchange& keys) override;
 
  private:
+  bool hasElevation_;
   CFMData0DFile* file_;
 };
 
 /// A forcing.
 class C2DStationBasedDataKvf : public CFMSEKvfBase {
  public:
+  /// A forcing of that quantity, or of precipitation depths.
   C2DStationBasedDataKvf(int itemType, std::string title, std::string section, CYbSEKvfBase* parent);
+  C2DStationBasedDataKvf(ForcingKind kind, std::string title, std::string section, CYbSEKvfBase* parent);
 
   enum Distribution : int { kUniform = 0, kStationBased = 1, kFullyDistributed = 2 };
 
   int DistributionType = kUniform;
+  float Elevation = 0;  ///< Of the uniform series, quantity 100180; only where the kind has elevations.
 
   const ForcingKind& Kind() const { return kind_; }
   int GetItemType() const { return kind_.itemTypes.front(); }
+  bool HasElevation() const { return !kind_.correctable.empty(); }
+  /// Whether the setup corrects the forcing for elevation.
+  virtual bool IsCorrectedForElevation() const { return false; }
   CGlobalKvf& Global() const { return *global_; }
   CStationBasedKvf& Stations() const { return *stations_; }
   CFullyDistributedKvf& FullyDistributed() const { return *fully_; }
@@ -150,13 +168,22 @@ class C2DStationBasedDataKvf : public CFMSEKvfBase {
   int ValidateData() override;
 
  protected:
-  void ExchangeKeys(KeyExchange& keys) override { keys.FromOne("DistributionType", DistributionType); }
+  void ExchangeKeys(KeyExchange& keys) override;
 
  private:
   ForcingKind kind_;
   CGlobalKvf* global_;
   CStationBasedKvf* stations_;
   CFullyDistributedKvf* fully_;
+};
+
+/// A forcing whose stations have a class of their own.
+template <class Station>
+class ForcingOf : public C2DStationBasedDataKvf {
+ public:
+  using C2DStationBasedDataKvf::C2DStationBasedDataKvf;
+
+  std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override { return std::make_shared<Station>(Kind(), this); }
 };
 
 /// A constant or a time series without anything spatial.

@@ -188,7 +188,7 @@ CTvnCreate0DNdsDlg::CTvnCreate0DNdsDlg(const PageContext& context, const CYbSEKv
     : CYbSEDlgBase(values_, WithoutDocument(context)),
       forNode_(node),
       itemTypes_(std::move(itemTypes)),
-      valueTypes_(std::move(valueTypes)),
+      valueTypes_(valueTypes.empty() ? std::vector{0, 1, 2, 3} : std::move(valueTypes)),
       value_(static_cast<double>(value)),
       file_(NewFile(context, node.GetTitle(), "nds0")) {
   if (const auto* period = node.Important<CSimPeriodKvf>("SIMPERIOD")) {
@@ -216,7 +216,10 @@ void CTvnCreate0DNdsDlg::Describe(PageForm& form) {
   form.Date("Start Date:", start_).EnabledWhen(isOneValue);
   form.Date("End Date:", end_).EnabledWhen(isOneValue);
   form.Number("Time step:", stepHours_).Unit("hours").EnabledWhen(isOneValue);
-  form.Number("Value:", value_).Quantity(itemTypes_.front()).EnabledWhen(isOneValue);
+  for (std::size_t i = 0; i < itemTypes_.size(); ++i)
+    form.Number("Value:", value_).Quantity(itemTypes_[i]).EnabledWhen(isOneValue).ShownWhen([this, i] {
+      return itemType_ == static_cast<int>(i);
+    });
   form.LongText("Or dates and values, a row each, as pasted from a spreadsheet:", rows_);
   Control& file = form.File("Nds filename:", file_);
   file.Filter(kSeriesFileFilter).DefaultExtension("nds0");

@@ -74,6 +74,7 @@ class CData2DShpCreateDlg : public CYbSEDlgBase {
 /// A time series file: one value over a period, or rows that are pasted from elsewhere.
 class CTvnCreate0DNdsDlg : public CYbSEDlgBase {
  public:
+  /// Without value types all are offered.
   CTvnCreate0DNdsDlg(const PageContext& context, const CYbSEKvfBase& node, float value, std::vector<int> itemTypes,
                      std::vector<int> valueTypes);
   std::optional<FileName> Run();

@@ -4,6 +4,8 @@
 
 #include <algorithm>
 
+#include <fmt/format.h>
+
 #include "pages/spatial/create_dialogs.h"
 #include "pages/spatial/plot_content.h"
 #include "platform/units.h"
@@ -63,6 +65,7 @@ MapContent StationMap(const C2DStationBasedDataKvf& data, const CFMSEKvfGroupBas
   return map;
 }
 
+constexpr int kElevation = 100180;
 const std::vector<std::string> kTemporal{"Constant", "Time varying (.nds0)"};
 
 }  // namespace
@@ -90,7 +93,14 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
   const auto byPolygons = [&n] { return n.UsesPolygons(); };
   const auto sync = [this] { return Sync(); };
   form.Choice("Spatial Distribution:", n.DistributionType, {"Uniform", "Station based", "Fully distributed"})
-      .RevalidatesLater();
+      .RevalidatesLater()
+      .Then([this] {
+        if (Node().DistributionType == Node_::kFullyDistributed && Node().IsCorrectedForElevation())
+          Outside().Tell(fmt::format("Warning: Fully distributed {} cannot be corrected for elevation.",
+                                     Node().Kind().correctable),
+                         Host::Icon::Warning);
+        return 0;
+      });
   form.Choice("Temporal Distribution:", n.Global().TYPE, kTemporal).Key("TYPE").ShownWhen(is(Node_::kUniform));
   form.Choice("Data Type:", n.Stations().TYPE, {"Grid codes (.nds2)", "Polygons (.shp)"})
       .ShownWhen(is(Node_::kStationBased))
@@ -99,6 +109,10 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
       form, *this, Context(),
       {n.Global().TYPE, n.Global().FIXED_VALUE, n.Global().SeriesFile(), n.Kind().itemTypes, n.Kind().valueTypes},
       is(Node_::kUniform));
+  if (n.HasElevation())
+    form.Number("Elevation:", n.Elevation).Quantity(kElevation).ShownWhen([&n] {
+      return n.DistributionType == Node_::kUniform && n.IsCorrectedForElevation();
+    });
 
   form.DataFile("Station Based Distribution File:", n.Stations().GridFile())
       .Filter("Station distr.files (*.nds2) |*.nds2|All Files (*.*) |*.*||")
@@ -178,6 +192,10 @@ void C2DStationBaseDataTimeSeriesDlg::Describe(PageForm& form) {
   DescribeValueOrSeries(form, *this, Context(),
                         {n.TYPE, n.FIXED_VALUE, n.SeriesFile(), data->Kind().itemTypes, data->Kind().valueTypes},
                         [] { return true; });
+  if (data->HasElevation())
+    form.Number("Elevation:", n.Elevation).Quantity(kElevation).ShownWhen([data] {
+      return data->IsCorrectedForElevation();
+    });
   form.Map([&n, data] { return StationMap(*data, &n); });
 }
 

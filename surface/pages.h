@@ -1,0 +1,20 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The pages of what happens at and above the ground, by the names and resource numbers under which a shell knows them.
+#pragma once
+
+#include "core/page_class.h"
+
+namespace tervane {
+
+inline constexpr PageClass kClimatePage{"CPrecipitationRelatedDlg", 16539};
+inline constexpr PageClass kPrecipitationPage{"CPrecipitationDlg", 16538};
+inline constexpr PageClass kPrecipitationStationPage{"CPrecTimeSeriesDlg", 16540};
+inline constexpr PageClass kPotEvapTransPage{"CPotEvapTransDlg", 16538};
+inline constexpr PageClass kPotEvapTransStationPage{"CPotEvapTransTimeSeriesDlg", 16540};
+inline constexpr PageClass kAirTemperaturePage{"CSnowmeltDlg", 16538};
+inline constexpr PageClass kAirTemperatureStationPage{"CSnowmeltTimeSeriesDlg", 16540};
+inline constexpr PageClass kSnowMeltPage{"CSnowmeltConstDlg", 16605};
+
+}  // namespace tervane
