@@ -73,6 +73,7 @@ SearchIndex::SearchIndex(CYbSEDocument& document) {
       if (!done.insert(entry.node).second) continue;
       PageTexts texts(entry);
       texts.Add(SearchHit::Kind::Title, entry.title, {}, {});
+      texts.Add(SearchHit::Kind::Title, entry.node->GetTitle(), {}, {});
       if (const auto page = MakePageToRead(*entry.page, *entry.node, {document, host, {}}))
         page->Form().ForEach([&](const Control& control) { texts.AddControl(control); });
       // Behind the page, whose controls lead to their keys better than a key alone.

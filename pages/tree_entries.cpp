@@ -24,6 +24,11 @@ class Place {
   std::string path_;
 };
 
+std::string ShortTitle(const CYbSEKvfBase& node) {
+  if (!node.GetAbbreviatedTitle().empty()) return node.GetAbbreviatedTitle();
+  return node.GetTitle().empty() ? StepName(node) : node.GetTitle();
+}
+
 void AddEntriesBelow(Place& place, int treeId, int depth, std::vector<TreeEntry>& entries) {
   for (CYbSEKvfBase* child = place.Node().GetFirstChild(); child; child = place.Node().GetNextChild(child)) {
     const PageClass* page = child->GetDlgRuntimeClass(treeId);
@@ -31,8 +36,7 @@ void AddEntriesBelow(Place& place, int treeId, int depth, std::vector<TreeEntry>
     Place below(*child, &place);
     if (page) {
       const std::string& path = below.Path();
-      const std::string& title = child->GetTitle();
-      entries.push_back({child, path, title.empty() ? StepName(*child) : title, depth, page});
+      entries.push_back({child, path, ShortTitle(*child), depth, page});
     }
     AddEntriesBelow(below, treeId, page ? depth + 1 : depth, entries);
   }

@@ -13,7 +13,7 @@ namespace tervane {
 struct TreeEntry {
   CYbSEKvfBase* node;
   std::string path;   ///< As `NodePlace` has it.
-  std::string title;  ///< The node's title, or its name in the path where it has none.
+  std::string title;  ///< The node's abbreviated title, where it has none its title, or else its name in the path.
   int depth;          ///< Number of entries above it.
   const PageClass* page;
 };
