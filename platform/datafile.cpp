@@ -16,6 +16,7 @@
 #include "platform/netcdf.h"
 #include "platform/os.h"
 #include "platform/paths.h"
+#include "platform/raster_file.h"
 
 namespace tervane {
 
@@ -24,19 +25,40 @@ namespace {
 /// Values that are converted at one time, small enough for the processor's cache.
 constexpr std::size_t kPiece = std::size_t{1} << 16;
 
-/// "" when the file begins as a netCDF file does and is whole as far as that shows.
-std::string WhyNoNetcdf(const std::string& path) {
+/// Whether a file is netCDF, by its first bytes; a classic one is whole as far as its header shows, else `reason` says
+/// what is wrong.
+bool IsNetcdf(const std::string& path, std::string& reason) {
   bool isClassic = false;
-  if (std::string reason = netcdf::WhyClassicFileIsBad(path, isClassic); !reason.empty() || isClassic) return reason;
+  reason = netcdf::WhyClassicFileIsBad(path, isClassic);
+  if (isClassic) return true;
+  reason.clear();
   std::error_code error;
   os::File file = os::File::OpenForReading(path, error);
   std::array<char, 8> begin{};
   constexpr std::string_view kHdf5 = "\x89HDF\r\n\x1a\n";
-  if (!error && file.Read(begin.data(), begin.size(), error) == begin.size() &&
-      std::string_view(begin.data(), begin.size()) == kHdf5) {
-    return {};
+  return !error && file.Read(begin.data(), begin.size(), error) == begin.size() &&
+         std::string_view(begin.data(), begin.size()) == kHdf5;
+}
+
+/// The bands of a raster as items that hold at all times.
+std::string HeaderOf(const RasterFacts& facts, DataFileHeader& header) {
+  const double cells = static_cast<double>(facts.geometry.nx) * static_cast<double>(facts.geometry.ny);
+  if (cells > static_cast<double>(kMostCells)) {
+    return fmt::format("it has {:.0f} cells; at most {} can be read; cut it into parts, or import it on a model grid",
+                       cells, kMostCells);
   }
-  return "it is no netCDF file";
+  header.notes = facts.notes;
+  for (const RasterBand& band : facts.bands) {
+    DataItem& item = header.items.emplace_back();
+    item.name = band.name;
+    item.itemType = band.itemType;
+    item.dimensions = 2;
+    item.geometry = facts.geometry;
+    const std::optional<int> unitKey = band.unitKey != 0 ? std::optional(band.unitKey) : std::nullopt;
+    if (std::string note = SetUnit(item, band.unitText, unitKey); !note.empty()) header.notes.push_back(std::move(note));
+    header.storages.emplace_back().variable = band.number;
+  }
+  return {};
 }
 
 /// Puts kDeleteValue for what is missing in values that are stored as they are.
@@ -139,6 +161,7 @@ void ValueSummary::Add(const ValueSummary& other) {
 struct DataFile::State {
   std::string path;
   netcdf::Handle file;
+  std::optional<RasterFile> raster;  ///< Where the file is no netCDF.
   DataFileHeader header;
 
   ~State() {
@@ -151,6 +174,9 @@ struct DataFile::State {
                           std::size_t nx, std::span<float> values, const UnitConversion* conversion) const;
   std::string ReadByBoxes(const ItemStorage& storage, const DataItem& item, std::size_t step, std::optional<int> layer,
                           std::span<float> values, const UnitConversion* conversion) const;
+  /// Reads a band of a raster; the error names the file.
+  std::string ReadRaster(const ItemStorage& storage, const DataItem& item, std::span<float> values,
+                         const UnitConversion* conversion) const;
 };
 
 namespace {
@@ -293,6 +319,13 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
   return fits ? std::string() : kTooLarge;
 }
 
+std::string DataFile::State::ReadRaster(const ItemStorage& storage, const DataItem& item, std::span<float> values,
+                                        const UnitConversion* conversion) const {
+  std::string error = raster->Read(storage.variable, {0, 0, item.geometry.nx, item.geometry.ny}, values);
+  if (!error.empty() || conversion == nullptr || Convert(*conversion, values)) return error;
+  return fmt::format("cannot read {}: item {}: {}", path, item.name, kTooLarge);
+}
+
 DataFile::DataFile() : state_(std::make_unique<State>()) {}
 DataFile::DataFile(DataFile&& other) noexcept = default;
 DataFile& DataFile::operator=(DataFile&& other) noexcept = default;
@@ -304,8 +337,11 @@ std::string DataFile::Open(const std::string& path) {
   std::string reason = WhyNotReadable(path);
   if (!reason.empty()) return reason;
   try {
-    reason = WhyNoNetcdf(path);
-    if (reason.empty()) {
+    if (!IsNetcdf(path, reason)) {
+      state->raster.emplace();
+      if (std::string error = state->raster->Open(path); !error.empty()) return error;
+      reason = HeaderOf(state->raster->Facts(), state->header);
+    } else if (reason.empty()) {
       const netcdf::Lock lock;
       int id = -1;
       // An absolute path, because the library takes others for addresses of the network.
@@ -371,6 +407,7 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
   }
 
   const UnitConversion* converter = conversion ? &*conversion : nullptr;
+  if (state_->raster) return values.empty() ? std::string() : state_->ReadRaster(storage, item, values, converter);
   const bool isInOrder = storage.type == NC_FLOAT && !storage.IsPacked() && storage.IsInOrder();
   // A series is read in one call, grids step by step.
   const bool isSeries = item.dimensions == 0;

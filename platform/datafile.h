@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 // Data files: time series (.nds0), lines (.nds1), grids (.nds2) and layers of grids (.nds3) over time. They are netCDF
-// by the CF conventions 1.8 (https://cfconventions.org); files of other programs in any kind of netCDF are read as
-// well.
+// by the CF conventions 1.8 (https://cfconventions.org). Files of other programs are read as well: any kind of netCDF,
+// and rasters (GeoTIFF, ASCII grids, ...), whose bands are grids that hold at all times.
 //
 // This is the one interface to them. Who knows the operations by their old names finds them here: ndsFileRead is
 // DataFile::Open; ndsFileClose and ndsHeaderDestroy the end of the object; ndsGetNoOfItems and ndsItemD `Items`;

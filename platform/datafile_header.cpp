@@ -269,25 +269,9 @@ class HeaderReader {
                                    item.name, item.itemType));
       item.itemType = kUndefinedItemType;
     }
-    item.unitText = TextAttribute(file_, id, "units");
-    const Unit* unit = FindUnit(IntAttribute(file_, id, "unit_key").value_or(-1));
-    // Another program may have converted the values and changed the text alone: the text counts.
-    const bool isSame = unit != nullptr && (item.unitText == unit->udunits || item.unitText == unit->text);
-    if (isSame || item.unitText.empty()) {
-      if (unit == nullptr) unit = FindUnit(kDimensionlessUnit);
-      item.unitKey = unit->key;
-      item.scale = unit->scale;
-      item.unitText = unit->text;
-    } else if (const std::optional<ParsedUnit> parsed = ParseUnit(item.unitText)) {
-      item.scale = parsed->scale;
-      if (parsed->unit != nullptr) item.unitKey = parsed->unit->key;
-    }
-    if (item.itemType != kUndefinedItemType) {
-      const Unit& base = BaseUnit(*FindItemType(item.itemType));
-      if (!item.scale || item.scale->dimension != base.scale.dimension) {
-        notes_.push_back(fmt::format("the item {} has the unit \"{}\", which is none of {}", item.name, item.unitText,
-                                     FindItemType(item.itemType)->name));
-      }
+    if (std::string note = SetUnit(item, TextAttribute(file_, id, "units"), IntAttribute(file_, id, "unit_key"));
+        !note.empty()) {
+      notes_.push_back(std::move(note));
     }
     const std::optional<int> type = IntAttribute(file_, id, "value_type");
     if (type && *type >= 0 && *type <= 3) {
@@ -562,6 +546,26 @@ bool ItemStorage::IsInOrder() const {
     last = place;
   }
   return !isXTurned && !isZTurned;
+}
+
+std::string SetUnit(DataItem& item, std::string unitText, std::optional<int> unitKey) {
+  item.unitText = std::move(unitText);
+  const Unit* unit = FindUnit(unitKey.value_or(-1));
+  // Another program may have converted the values and changed the text alone: the text counts.
+  const bool isSame = unit != nullptr && (item.unitText == unit->udunits || item.unitText == unit->text);
+  if (isSame || item.unitText.empty()) {
+    if (unit == nullptr) unit = FindUnit(kDimensionlessUnit);
+    item.unitKey = unit->key;
+    item.scale = unit->scale;
+    item.unitText = unit->text;
+  } else if (const std::optional<ParsedUnit> parsed = ParseUnit(item.unitText)) {
+    item.scale = parsed->scale;
+    if (parsed->unit != nullptr) item.unitKey = parsed->unit->key;
+  }
+  if (item.itemType == kUndefinedItemType) return {};
+  const ItemType& type = *FindItemType(item.itemType);
+  if (item.scale && item.scale->dimension == BaseUnit(type).scale.dimension) return {};
+  return fmt::format("the item {} has the unit \"{}\", which is none of {}", item.name, item.unitText, type.name);
 }
 
 std::string ReadHeader(int file, DataFileHeader& header) { return HeaderReader(file, header).Read(); }

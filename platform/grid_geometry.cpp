@@ -77,12 +77,22 @@ EvenAxis FindSpacing(std::span<const double> values, bool areSinglePrecision) {
   return axis;
 }
 
-std::string GeoTransformText(const FileGeometry& geometry) {
+GeoTransform GeoTransformOf(const FileGeometry& geometry, bool isNorthFirst) {
   double sine = 0, cosine = 1;
   SineAndCosine(geometry.rotation, sine, cosine);
   const double width = geometry.cellSize, height = geometry.cellHeight;
+  GeoTransform transform{geometry.x0, width * cosine, -height * sine, geometry.y0, width * sine, height * cosine};
+  if (!isNorthFirst) return transform;
+  transform[0] += geometry.ny * transform[2];
+  transform[3] += geometry.ny * transform[5];
+  transform[2] = -transform[2];
+  transform[5] = -transform[5];
+  return transform;
+}
+
+std::string GeoTransformText(const FileGeometry& geometry) {
   std::string text;
-  for (const double number : {geometry.x0, width * cosine, -height * sine, geometry.y0, width * sine, height * cosine})
+  for (const double number : GeoTransformOf(geometry, false))
     text += (text.empty() ? "" : " ") + ShortestNumber(number + 0.0);  // + 0.0: without the sign of a zero
   return text;
 }

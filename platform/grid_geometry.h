@@ -40,6 +40,8 @@ EvenAxis FindSpacing(std::span<const double> values, bool areSinglePrecision);
 /// y = [3] + column·[4] + row·[5], counted from the outer corner of the first stored cell.
 using GeoTransform = std::vector<double>;
 
+/// The transform of a file whose row 0 is the south, or the north.
+GeoTransform GeoTransformOf(const FileGeometry& geometry, bool isNorthFirst);
 /// The text for a data file whose row 0 is the south.
 std::string GeoTransformText(const FileGeometry& geometry);
 /// Nothing when the text is not six finite numbers.

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/os.h"
 
+#include <filesystem>
 #include <utility>
 
 #ifdef _WIN32
@@ -29,6 +30,7 @@
 #include <vector>
 
 #include <cxxabi.h>
+#include <dlfcn.h>
 #include <fcntl.h>
 #include <locale.h>
 #include <pwd.h>
@@ -178,6 +180,25 @@ CLocaleScope::~CLocaleScope() {
   std::setlocale(LC_ALL, before_.c_str());
   _configthreadlocale(perThread_);
 }
+
+std::string ProgramFolder() {
+  std::wstring path(32768, L'\0');
+  path.resize(GetModuleFileNameW(nullptr, path.data(), static_cast<DWORD>(path.size())));
+  return TextOfPath(std::filesystem::path(path).parent_path());
+}
+
+void* LoadSharedLibrary(const std::string& path, std::string& reason) {
+  // Libraries that it needs are looked for beside it too.
+  void* const library = LoadLibraryExW(Wide(path).c_str(), nullptr, LOAD_WITH_ALTERED_SEARCH_PATH);
+  if (library == nullptr) reason = LastError().message();
+  return library;
+}
+
+void* FunctionOf(void* library, const char* name) {
+  return reinterpret_cast<void*>(GetProcAddress(static_cast<HMODULE>(library), name));
+}
+
+std::string SharedLibraryName(std::string_view name) { return std::string(name) + ".dll"; }
 
 std::string DemangledName(const std::type_info& type) {
   // "class tervane::CGlobal"
@@ -456,6 +477,21 @@ CLocaleScope::CLocaleScope() {
 CLocaleScope::~CLocaleScope() {
   if (before_ != nullptr) uselocale(static_cast<locale_t>(before_));
 }
+
+std::string ProgramFolder() {
+  std::error_code error;
+  return std::filesystem::read_symlink("/proc/self/exe", error).parent_path().string();
+}
+
+void* LoadSharedLibrary(const std::string& path, std::string& reason) {
+  void* const library = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
+  if (library == nullptr) reason = dlerror();
+  return library;
+}
+
+void* FunctionOf(void* library, const char* name) { return dlsym(library, name); }
+
+std::string SharedLibraryName(std::string_view name) { return std::string(name) + ".so"; }
 
 std::string DemangledName(const std::type_info& type) {
   int status = 0;

@@ -96,6 +96,16 @@ class CLocaleScope {
 #endif
 };
 
+/// The folder of the running program; empty where unknown.
+std::string ProgramFolder();
+
+/// Loads a shared library into the process, where it stays to the end. Null, with the system's reason, when that fails.
+void* LoadSharedLibrary(const std::string& path, std::string& reason);
+/// A function of a loaded library by its name; null when there is none.
+void* FunctionOf(void* library, const char* name);
+/// The file name of a shared library that is loaded in this way.
+std::string SharedLibraryName(std::string_view name);
+
 /// Name of a type as it stands in the source, with its namespaces.
 std::string DemangledName(const std::type_info& type);
 
