@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <map>
+#include <tuple>
 
 #include <CLI/CLI.hpp>
 
@@ -101,7 +102,8 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
     return KeysCommand(typed.markdown, streams);
   })->add_flag("--markdown", typed.markdown, "As a page of the manual");
 
-  CLI::App* data = app.add_subcommand("data", "Look into data files (.nds0 to .nds3, netCDF)");
+  CLI::App* data =
+      app.add_subcommand("data", "Look into data files (.nds0 to .nds3, netCDF) and rasters (GeoTIFF, ...)");
   data->require_subcommand(1);
   const auto dataCommand = [&](const char* name, const char* description, auto run) {
     CLI::App* subcommand = data->add_subcommand(name, description);
@@ -135,11 +137,47 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
       ->transform(CLI::CheckedTransformer(stampPlaces));
   series->add_flag("--force", seriesImport.force, "Replace a file that exists");
 
-  CLI::App* exporting = command("export", "Write time series (.nds0) as a table (CSV)",
-                                [&] { return ExportCommand(typed.file, typed.secondFile, typed.force, streams); });
-  exporting->add_option("FILE", typed.file, "The data file")->required();
-  exporting->add_option("OUT", typed.secondFile, "The table to write")->required();
-  exporting->add_flag("--force", typed.force, "Replace a file that exists");
+  CLI::App* gridding =
+      import->add_subcommand("grid", "Make a grid (.nds2) of a band of a raster (GeoTIFF, ASCII grid, ...)");
+  gridding->footer(
+      "UNITS. The values are in the unit of --unit, without it in the one that the raster names, without that in the\n"
+      "item type's base unit. A unit that the item type has is kept with the values as they are; values in any other\n"
+      "unit (feet for an elevation, say) are converted to the base unit.\n"
+      "PLACE. Without --like the grid has the raster's own cells. With it a cell takes: the raster's value, where the\n"
+      "cells agree; codes (item type 100370, or 999 with whole numbers of at most 100 values) from the nearest cell;\n"
+      "else the average of the raster's cells in it, where two or more go across, or the bilinear value between them.\n"
+      "Where both projections are known and differ, places are converted.");
+  GridImport gridImport;
+  gridding->callback([&] { status = ImportGridCommand(gridImport, streams); });
+  gridding->add_option("RASTER", gridImport.in, "The raster, of any kind that GDAL reads")->required();
+  gridding->add_option("OUT", gridImport.out, "The data file to write")->required();
+  gridding->add_option("--item", gridImport.itemType, "The code of the item type")->required();
+  gridding->add_option("--unit", gridImport.unit, "The unit of the raster's values; see UNITS");
+  gridding->add_option("--band", gridImport.band, "The number of the band, from 1; not needed where there is only one")
+      ->check(CLI::PositiveNumber);
+  gridding->add_option("--like", gridImport.like, "A setup (.tvd), on whose model grid the values are put; see PLACE");
+  const std::map<std::string, Resampling> methods{
+      {"nearest", Resampling::Nearest}, {"bilinear", Resampling::Bilinear}, {"average", Resampling::Average}};
+  gridding->add_option("--resample", gridImport.resampling, "How, with --like, instead of what PLACE tells")
+      ->transform(CLI::CheckedTransformer(methods))
+      ->needs("--like");
+  gridding->add_flag("--force", gridImport.force, "Replace a file that exists");
+
+  Export exported;
+  CLI::App* exporting = command("export", "Write time series (.nds0) as a table (CSV), or a grid as GeoTIFF",
+                                [&] { return ExportCommand(exported, streams); });
+  exporting->add_option("FILE", exported.in, "The data file")->required();
+  exporting->add_option("OUT", exported.out, "The file to write: a GeoTIFF when it ends in .tif, else a table")
+      ->required();
+  for (const auto& [name, number, description] :
+       {std::tuple{"--item", &exported.item, "The item of a grid, from 1; the first without it"},
+        std::tuple{"--step", &exported.step, "Its time step, from 1; the first without it"},
+        std::tuple{"--layer", &exported.layer, "Its layer, from 1 at the bottom; the lowest without it"}}) {
+    exporting->add_option(name, *number, description)->check(CLI::PositiveNumber)->each([&](const std::string&) {
+      exported.isPartNamed = true;
+    });
+  }
+  exporting->add_flag("--force", exported.force, "Replace a file that exists");
 
   command("completion", "Print the completion script for bash; use: source <(tervane completion)", [&] {
     out << BashCompletion(app);

@@ -2,8 +2,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <optional>
 #include <ostream>
 #include <string>
+
+#include "platform/grid_resampling.h"
 
 namespace tervane {
 
@@ -12,6 +15,9 @@ struct Streams {
   std::ostream& out;
   std::ostream& err;
 };
+
+/// Tells why a command could not do its work; gives its exit status.
+int Refuse(Streams streams, const std::string& reason);
 
 /// True, with a message, when the file exists and is not to be replaced.
 bool RefuseToReplace(const std::string& file, bool force, Streams streams);
@@ -51,7 +57,26 @@ struct SeriesImport {
   bool force = false;
 };
 int ImportSeriesCommand(const SeriesImport& import, Streams streams);
-/// Time series as a table.
-int ExportCommand(const std::string& in, const std::string& out, bool force, Streams streams);
+/// What makes a data file of a band of a raster.
+struct GridImport {
+  std::string in, out;
+  int itemType = 0;
+  int band = 0;  ///< 0: the only one.
+  std::string unit;
+  std::string like;                      ///< A setup, on whose model grid the values are put.
+  std::optional<Resampling> resampling;  ///< Without one what suits.
+  bool force = false;
+};
+int ImportGridCommand(const GridImport& import, Streams streams);
+
+/// What of a data file is written for other programs.
+struct Export {
+  std::string in, out;
+  int item = 1, step = 1, layer = 1;  ///< Of grids.
+  bool isPartNamed = false;           ///< One of them was given.
+  bool force = false;
+};
+/// Time series as a table, or a grid as GeoTIFF where `out` says so.
+int ExportCommand(const Export& wanted, Streams streams);
 
 }  // namespace tervane

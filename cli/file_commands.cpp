@@ -23,6 +23,11 @@ int Save(CFlowModelDoc& document, const std::string& file, Streams streams) {
 
 }  // namespace
 
+int Refuse(Streams streams, const std::string& reason) {
+  fmt::print(streams.err, "{}\n", reason);
+  return kCouldNot;
+}
+
 bool RefuseToReplace(const std::string& file, bool force, Streams streams) {
   if (RefuseHeld(file, force, streams)) return true;
   if (force || !FileExists(file)) return false;

@@ -148,44 +148,86 @@ bool CYbMapProjection::IsSameAs(const CYbMapProjection& other) const {
   return registeredA && registeredB && IsEquivalent(registeredA.get(), registeredB.get());
 }
 
-struct CYbCartography::Transformation {
+namespace {
+
+/// An operation in a context of its own, so that it may be used in another thread than the one that made it.
+struct Operation {
   Context context;
   Object operation;
+
+  /// No operation when no way is known from one system to the other; both are of this thread.
+  Operation(const PJ* from, const PJ* to) : context(MakeContext()) {
+    const Object ownFrom(proj_clone(context.get(), from)), ownTo(proj_clone(context.get(), to));
+    const Object made(proj_create_crs_to_crs_from_pj(context.get(), ownFrom.get(), ownTo.get(), nullptr, nullptr));
+    // Longitude first, whatever order the register has.
+    if (made) operation.reset(proj_normalize_for_visualization(context.get(), made.get()));
+  }
+
+  bool Convert(PJ_DIRECTION direction, double& x, double& y) const {
+    if (!std::isfinite(x) || !std::isfinite(y)) return false;
+    proj_errno_reset(operation.get());
+    const PJ_COORD result = proj_trans(operation.get(), direction, proj_coord(x, y, 0, HUGE_VAL));
+    if (proj_errno(operation.get()) != 0 || !std::isfinite(result.xy.x) || !std::isfinite(result.xy.y)) return false;
+    x = result.xy.x;
+    y = result.xy.y;
+    return true;
+  }
+};
+
+std::string WhyNotOnGlobe(const CYbMapProjection& projection) {
+  std::string problem = projection.Problem();
+  return problem.empty() && projection.IsLocal() ? "a local plane has no place on the globe" : problem;
+}
+
+}  // namespace
+
+struct CYbCartography::Transformation {
+  Operation operation;
 };
 
 CYbCartography::CYbCartography(const std::string& projection, double longitude, double latitude, double rotation) {
   const CYbMapProjection asked(projection);
-  problem_ = asked.Problem();
-  if (problem_.empty() && asked.IsLocal()) problem_ = "a local plane has no place on the globe";
+  problem_ = WhyNotOnGlobe(asked);
   if (problem_.empty() && (longitude != 0 || latitude != 0 || rotation != 0)) {
     problem_ = "a place and a rotation beside the projection are not supported";
   }
   if (!problem_.empty()) return;
-  // A context of its own: the object may be used in another thread than the one that made it.
-  transformation_ = std::make_unique<Transformation>(Transformation{MakeContext(), nullptr});
-  PJ_CONTEXT* const context = transformation_->context.get();
-  const Object system = MakeSystem(projection);
-  const Object target(proj_create(context, "EPSG:4326"));
-  const Object own(system ? proj_clone(context, system.get()) : nullptr);
-  const Object operation(
-      own && target ? proj_create_crs_to_crs_from_pj(context, own.get(), target.get(), nullptr, nullptr) : nullptr);
-  // Longitude first, whatever order the register has.
-  if (operation) transformation_->operation.reset(proj_normalize_for_visualization(context, operation.get()));
-  if (!transformation_->operation)
+  const Object system = MakeSystem(projection), target(proj_create(ThreadContext(), "EPSG:4326"));
+  if (system && target)
+    transformation_ = std::make_unique<Transformation>(Transformation{{system.get(), target.get()}});
+  if (!transformation_ || !transformation_->operation.operation)
     problem_ = fmt::format("no way is known from {} to longitude and latitude", asked.Name());
 }
 
 CYbCartography::~CYbCartography() = default;
 
 bool CYbCartography::Proj2Geo(double x, double y, double& longitude, double& latitude) const {
-  if (!problem_.empty() || !std::isfinite(x) || !std::isfinite(y)) return false;
-  PJ* const operation = transformation_->operation.get();
-  proj_errno_reset(operation);
-  const PJ_COORD result = proj_trans(operation, PJ_FWD, proj_coord(x, y, 0, HUGE_VAL));
-  if (proj_errno(operation) != 0 || !std::isfinite(result.xy.x) || !std::isfinite(result.xy.y)) return false;
-  longitude = result.xy.x;
-  latitude = result.xy.y;
+  if (!problem_.empty() || !transformation_->operation.Convert(PJ_FWD, x, y)) return false;
+  longitude = x;
+  latitude = y;
   return true;
+}
+
+struct CYbProjectionChange::Transformation {
+  Operation operation;
+};
+
+CYbProjectionChange::CYbProjectionChange(const std::string& from, const std::string& to) {
+  const CYbMapProjection asked(from), wanted(to);
+  problem_ = WhyNotOnGlobe(asked);
+  if (problem_.empty()) problem_ = WhyNotOnGlobe(wanted);
+  if (!problem_.empty()) return;
+  const Object source = MakeSystem(from), target = MakeSystem(to);
+  if (source && target)
+    transformation_ = std::make_unique<Transformation>(Transformation{{source.get(), target.get()}});
+  if (!transformation_ || !transformation_->operation.operation)
+    problem_ = fmt::format("no way is known from {} to {}", asked.Name(), wanted.Name());
+}
+
+CYbProjectionChange::~CYbProjectionChange() = default;
+
+bool CYbProjectionChange::Convert(double& x, double& y, bool isForward) const {
+  return problem_.empty() && transformation_->operation.Convert(isForward ? PJ_FWD : PJ_INV, x, y);
 }
 
 FileResult ReadProjectionFile(const std::string& path, std::string& text) {

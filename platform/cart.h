@@ -61,6 +61,28 @@ class CYbCartography {
   std::string problem_;
 };
 
+/// Turns points of one projection into those of another. May be used in any thread, but in one at a time.
+class CYbProjectionChange {
+ public:
+  /// Both must be coordinate systems with a place on the globe; else `Problem` tells.
+  CYbProjectionChange(const std::string& from, const std::string& to);
+  ~CYbProjectionChange();
+  CYbProjectionChange(const CYbProjectionChange&) = delete;
+  CYbProjectionChange& operator=(const CYbProjectionChange&) = delete;
+
+  const std::string& Problem() const { return problem_; }
+  /// Longitude stands before latitude. False where the other projection has no such point; then the outs stay.
+  bool Forward(double& x, double& y) const { return Convert(x, y, true); }
+  bool Back(double& x, double& y) const { return Convert(x, y, false); }
+
+ private:
+  bool Convert(double& x, double& y, bool isForward) const;
+
+  struct Transformation;
+  std::unique_ptr<Transformation> transformation_;
+  std::string problem_;
+};
+
 /// Reads the text of a projection file (.prj). A text that is no coordinate system is an error; `text` holds it all the
 /// same.
 FileResult ReadProjectionFile(const std::string& path, std::string& text);

@@ -55,7 +55,8 @@ std::string HeaderOf(const RasterFacts& facts, DataFileHeader& header) {
     item.dimensions = 2;
     item.geometry = facts.geometry;
     const std::optional<int> unitKey = band.unitKey != 0 ? std::optional(band.unitKey) : std::nullopt;
-    if (std::string note = SetUnit(item, band.unitText, unitKey); !note.empty()) header.notes.push_back(std::move(note));
+    if (std::string note = SetUnit(item, band.unitText, unitKey); !note.empty())
+      header.notes.push_back(std::move(note));
     header.storages.emplace_back().variable = band.number;
   }
   return {};

@@ -46,8 +46,8 @@ struct DataFileHeader {
   std::vector<std::string> notes;
 };
 
-/// Sets the unit of an item, whose name and type are known, by what its file tells: a text, and a key of our table where
-/// the file is ours. "" or a note that it does not fit the type.
+/// Sets the unit of an item, whose name and type are known, by what its file tells: a text, and a key of our table
+/// where the file is ours. "" or a note that it does not fit the type.
 std::string SetUnit(DataItem& item, std::string unitText, std::optional<int> unitKey);
 
 /// Reads an open file of the library, whose lock must be held. "" or why the file cannot be used.

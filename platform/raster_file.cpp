@@ -45,7 +45,8 @@ LoadedModule LoadRasterModule() {
                                name, folder)};
 }
 
-/// The lock of netCDF must be held, here and wherever the module is called: GDAL's driver for netCDF shares the library.
+/// The lock of netCDF must be held, here and wherever the module is called: GDAL's driver for netCDF shares the
+/// library.
 const LoadedModule& TheModule() {
   static const LoadedModule loaded = LoadRasterModule();
   return loaded;
@@ -137,14 +138,14 @@ std::string RasterFile::Open(const std::string& path) {
     state->raster = loaded.module->Open(AbsoluteFromHere(path), stored, reason);
   }
   if (!state->raster) {
-    return refused(reason.empty() ? "it is neither a data file nor a raster of a kind that is known here"
-                                  : fmt::format("it is damaged or of a kind that is not known here ({})", reason));
+    return refused(reason.empty() ? "it is neither a data file nor a raster of a kind that is known here" : reason);
   }
   if (stored.bands.empty()) {
-    return refused(stored.parts.empty()
-                       ? "it has no bands"
-                       : fmt::format("it holds several rasters ({}); write the one that is wanted into a file of its own",
-                                     Joined(stored.parts)));
+    return refused(
+        stored.parts.empty()
+            ? "it has no bands"
+            : fmt::format("it holds several rasters ({}); write the one that is wanted into a file of its own",
+                          Joined(stored.parts)));
   }
   RasterFacts& facts = state->facts;
   facts.format = stored.format;
@@ -164,7 +165,9 @@ std::string RasterFile::Open(const std::string& path) {
 }
 
 std::string RasterFile::Read(int band, const CellWindow& window, std::span<float> values) const {
-  const auto refused = [&](const std::string& reason) { return fmt::format("cannot read {}: {}", state_->path, reason); };
+  const auto refused = [&](const std::string& reason) {
+    return fmt::format("cannot read {}: {}", state_->path, reason);
+  };
   const RasterFacts& facts = state_->facts;
   if (std::ranges::none_of(facts.bands, [&](const RasterBand& other) { return other.number == band; })) {
     return refused(fmt::format("there is no band {}: the raster has {}", band, facts.bands.size()));
@@ -217,8 +220,7 @@ FileResult WriteGeoTiff(const std::string& path, const NewRaster& raster, std::s
       const netcdf::Lock lock;
       const LoadedModule& loaded = TheModule();
       if (loaded.module == nullptr) return failed(loaded.problem);
-      const std::string reason =
-          loaded.module->WriteGeoTiff(replacement.TemporaryPath(), stored, kDeleteValue, turned);
+      const std::string reason = loaded.module->WriteGeoTiff(replacement.TemporaryPath(), stored, kDeleteValue, turned);
       if (!reason.empty()) return failed(reason + "; the file is unchanged");
     }
     return replacement.Commit();

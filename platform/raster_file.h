@@ -1,8 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// Rasters of other programs: what GDAL reads (GeoTIFF, ASCII grids, ...) in our form, and grids written as GeoTIFF. GDAL
-// stands in a module that is loaded when it is first needed, from the program's folder or from `../lib`.
+// Rasters of other programs: what GDAL reads (GeoTIFF, ASCII grids, ...) in our form, and grids written as GeoTIFF.
+// GDAL stands in a module that is loaded when it is first needed, from the program's folder or from `../lib`.
 #pragma once
 
 #include <memory>
@@ -17,10 +17,10 @@
 namespace tervane {
 
 struct RasterBand {
-  int number = 1;           ///< In the file, from 1.
-  std::string name;         ///< Never empty: the band's description, else the file's name, with the number if needed.
-  std::string unitText;     ///< As the file names it; often empty.
-  bool isWhole = false;     ///< Stored as whole numbers.
+  int number = 1;        ///< In the file, from 1.
+  std::string name;      ///< Never empty: the band's description, else the file's name, with the number if needed.
+  std::string unitText;  ///< As the file names it; often empty.
+  bool isWhole = false;  ///< Stored as whole numbers.
   int itemType = kUndefinedItemType;  ///< Named in our own files.
   int unitKey = 0;                    ///< Likewise; 0 when it is not named.
 };
@@ -39,8 +39,8 @@ struct CellWindow {
   std::size_t CellCount() const { return static_cast<std::size_t>(nx) * static_cast<std::size_t>(ny); }
 };
 
-/// An open raster. Opening reads what the file tells of itself; values are read when they are asked for. Errors name the
-/// file, say what is wrong, and what to do.
+/// An open raster. Opening reads what the file tells of itself; values are read when they are asked for. Errors name
+/// the file, say what is wrong, and what to do.
 class RasterFile {
  public:
   RasterFile();

@@ -12,6 +12,7 @@
 #include <cpl_conv.h>
 #include <cpl_error.h>
 #include <cpl_string.h>
+#include <cpl_vsi.h>
 #include <fmt/format.h>
 #include <gdal.h>
 #include <ogr_spatialref.h>
@@ -91,6 +92,21 @@ std::vector<std::string> PartsOf(GDALDatasetH dataset) {
     const char* const last = std::strrchr(name, ':');
     parts.emplace_back(last != nullptr ? last + 1 : name);
   }
+}
+
+/// GDAL reads what was cut off a file of this format as zeros; its values stand there as they are, without a header.
+std::string WhyRawFileIsCut(GDALDatasetH dataset, const std::string& path) {
+  if (Text(GDALGetDriverShortName(GDALGetDatasetDriver(dataset))) != "ENVI") return {};
+  if (Text(GDALGetMetadataItem(dataset, "file_compression", "ENVI")) == "1") return {};
+  VSIStatBufL status;
+  if (VSIStatL(path.c_str(), &status) != 0) return {};
+  double needed = 0;
+  for (int i = 1; i <= GDALGetRasterCount(dataset); ++i)
+    needed += GDALGetDataTypeSizeBytes(GDALGetRasterDataType(GDALGetRasterBand(dataset, i)));
+  needed *= static_cast<double>(GDALGetRasterXSize(dataset)) * GDALGetRasterYSize(dataset);
+  if (static_cast<double>(status.st_size) >= needed) return {};
+  return fmt::format("it is cut: it has {} bytes, its header tells of {:.0f}; get the file again",
+                     static_cast<long long>(status.st_size), needed);
 }
 
 StoredBand BandOf(GDALRasterBandH band) {
@@ -183,9 +199,12 @@ std::unique_ptr<OpenRaster> GdalModule::Open(const std::string& path, StoredRast
   const Errors errors;
   Dataset dataset(GDALOpenEx(path.c_str(), GDAL_OF_RASTER | GDAL_OF_READONLY, nullptr, nullptr, nullptr));
   if (!dataset) {
-    reason = errors.First();
+    if (errors.HasFailed())
+      reason = fmt::format("it is damaged or of a kind that is not known here ({})", errors.First());
     return nullptr;
   }
+  reason = WhyRawFileIsCut(dataset.get(), path);
+  if (!reason.empty()) return nullptr;
   facts.format = Text(GDALGetDriverLongName(GDALGetDatasetDriver(dataset.get())));
   facts.nx = GDALGetRasterXSize(dataset.get());
   facts.ny = GDALGetRasterYSize(dataset.get());
