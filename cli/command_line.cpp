@@ -119,14 +119,18 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
 
   CLI::App* import = app.add_subcommand("import", "Make data files of other files");
   import->require_subcommand(1);
-  CLI::App* series = import->add_subcommand("series", "Make a time series (.nds0) of a column of a table (CSV)");
+  CLI::App* series = import->add_subcommand("series", "Make time series (.nds0) of columns of a table (CSV)");
   SeriesImport seriesImport;
   series->callback([&] { status = ImportSeriesCommand(seriesImport, streams); });
   series->add_option("CSV", seriesImport.in, "The table: names in its first line, ISO dates in its first column")
       ->required();
   series->add_option("OUT", seriesImport.out, "The data file to write")->required();
   series->add_option("--item", seriesImport.itemType, "The code of the item type")->required();
-  series->add_option("--column", seriesImport.column, "The name of the column; not needed where there is only one");
+  CLI::Option* column = series->add_option("--column", seriesImport.columns,
+                                           "The name of the column; not needed where there is only one. Given several "
+                                           "times, each makes an item");
+  column->allow_extra_args(false);
+  series->add_flag("--all-columns", seriesImport.isEveryColumn, "An item of each column")->excludes(column);
   series->add_option("--unit", seriesImport.unit, "The unit of the values; the item type's base unit without it");
   const std::map<std::string, int> valueTypes{
       {"instantaneous", 0}, {"accumulated", 1}, {"step-accumulated", 2}, {"mean-step", 3}};

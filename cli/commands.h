@@ -5,6 +5,7 @@
 #include <optional>
 #include <ostream>
 #include <string>
+#include <vector>
 
 #include "platform/grid_resampling.h"
 
@@ -47,11 +48,13 @@ int DataInfoCommand(const std::string& path, bool json, Streams streams);
 /// The range, mean and missing values of each item; reads the whole file.
 int DataStatsCommand(const std::string& path, Streams streams);
 
-/// What makes a data file of a column of a table.
+/// What makes a data file of columns of a table.
 struct SeriesImport {
   std::string in, out;
   int itemType = 0;
-  std::string column, unit;
+  std::vector<std::string> columns;  ///< None: the only one.
+  bool isEveryColumn = false;
+  std::string unit;
   int valueType = 0;
   bool stampsAreBegins = false;
   bool force = false;

@@ -25,12 +25,39 @@ void MoveToEnds(std::vector<CYbDateTime>& stamps) {
   stamps.push_back(stamps.back() + last);
 }
 
-std::string Write(const std::string& path, const NewDataFile& content, const CsvSeries& series, FileResult& result) {
+/// The series of an import, which all have the dates of the first.
+struct Columns {
+  std::vector<CsvSeries> series;
+  std::vector<NewItem> items;
+};
+
+/// Reads the wanted columns in the unit of their item. "" or why not.
+std::string ReadColumns(const SeriesImport& import, const ItemType& type, Columns& columns, Streams streams) {
+  FileContent text;
+  if (FileResult read = ReadWholeFile(import.in, text); !read.Ok()) return read.error;
+  std::vector<std::string> names = import.isEveryColumn ? CsvColumns(text.Text()) : import.columns;
+  if (names.empty()) names.emplace_back();
+  for (const std::string& name : names) {
+    CsvSeries& series = columns.series.emplace_back(ReadCsvSeries(text.Text(), name));
+    if (!series.error.empty()) return fmt::format("{}: {}", import.in, series.error);
+    const std::string column = names.size() > 1 ? fmt::format("column {}: ", series.column) : std::string();
+    for (const std::string& note : series.notes) fmt::print(streams.err, "{}: note: {}{}\n", import.in, column, note);
+    NewItem& item = columns.items.emplace_back();
+    item = {series.column, type.code, 0, static_cast<ValueType>(import.valueType)};
+    if (std::string error = TakeUnit(import.unit, type, item, series.values); !error.empty()) return error;
+  }
+  return {};
+}
+
+std::string Write(const std::string& path, const NewDataFile& content, const Columns& columns, FileResult& result) {
   DataFileWriter writer;
   if (std::string error = writer.Create(path, content); !error.empty()) return error;
-  for (std::size_t i = 0; i < series.stamps.size(); ++i) {
-    if (std::string error = writer.AddStep(series.stamps[i]); !error.empty()) return error;
-    if (std::string error = writer.Put(1, std::span(series.values).subspan(i, 1)); !error.empty()) return error;
+  const std::vector<CYbDateTime>& stamps = columns.series.front().stamps;
+  for (std::size_t i = 0; i < stamps.size(); ++i) {
+    if (std::string error = writer.AddStep(stamps[i]); !error.empty()) return error;
+    int item = 0;
+    for (const CsvSeries& series : columns.series)
+      if (std::string error = writer.Put(++item, std::span(series.values).subspan(i, 1)); !error.empty()) return error;
   }
   result = writer.Finish();
   return result.error;
@@ -42,34 +69,31 @@ int ImportSeriesCommand(const SeriesImport& import, Streams streams) {
   const ItemType* type = FindItemType(import.itemType);
   if (type == nullptr) return Refuse(streams, fmt::format("there is no item type {}", import.itemType));
   if (RefuseToReplace(import.out, import.force, streams)) return kCouldNot;
-  FileContent text;
-  if (const FileResult read = ReadWholeFile(import.in, text); !read.Ok()) return Refuse(streams, read.error);
-  CsvSeries series = ReadCsvSeries(text.Text(), import.column);
-  if (!series.error.empty()) return Refuse(streams, fmt::format("{}: {}", import.in, series.error));
-  for (const std::string& note : series.notes) fmt::print(streams.err, "{}: note: {}\n", import.in, note);
+  Columns columns;
+  if (const std::string error = ReadColumns(import, *type, columns, streams); !error.empty()) {
+    return Refuse(streams, error);
+  }
 
   NewDataFile content;
   content.dimensions = 0;
-  NewItem item{series.column, type->code, 0, static_cast<ValueType>(import.valueType)};
-  if (const std::string error = TakeUnit(import.unit, *type, item, series.values); !error.empty()) {
-    return Refuse(streams, error);
-  }
+  content.items = columns.items;
+  std::vector<CYbDateTime>& stamps = columns.series.front().stamps;
   if (import.stampsAreBegins) {
-    if (series.stamps.size() < 2) {
+    if (stamps.size() < 2) {
       return Refuse(streams,
                     fmt::format("{}: one line does not tell how long its interval is; give --stamps end", import.in));
     }
-    content.begin = series.stamps.front();
-    MoveToEnds(series.stamps);
+    content.begin = stamps.front();
+    MoveToEnds(stamps);
   }
-  content.items = {item};
   FileResult result;
-  if (const std::string error = Write(import.out, content, series, result); !error.empty()) {
+  if (const std::string error = Write(import.out, content, columns, result); !error.empty()) {
     return Refuse(streams, error);
   }
   if (!result.note.empty()) fmt::print(streams.err, "{}: {}\n", import.out, result.note);
-  fmt::print(streams.out, "{}: {} steps of {} from {} to {}\n", import.out, series.stamps.size(), type->name,
-             DateInWords(series.stamps.front()), DateInWords(series.stamps.back()));
+  fmt::print(streams.out, "{}: {}{} steps of {} from {} to {}\n", import.out,
+             columns.items.size() > 1 ? fmt::format("{} items, ", columns.items.size()) : std::string(), stamps.size(),
+             type->name, DateInWords(stamps.front()), DateInWords(stamps.back()));
   return kDone;
 }
 

@@ -186,6 +186,15 @@ std::size_t FindColumn(const std::vector<std::string>& names, std::string_view w
 
 }  // namespace
 
+std::vector<std::string> CsvColumns(std::string_view text) {
+  CsvReader reader(text);
+  std::vector<std::string> names;
+  if (!reader.Next(names)) return {};
+  names.erase(names.begin());
+  for (std::string& name : names) name = Trimmed(name);
+  return names;
+}
+
 CsvSeries ReadCsvSeries(std::string_view text, std::string_view column) {
   CsvSeries series;
   if (text.find('\0') != std::string_view::npos) {

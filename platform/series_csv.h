@@ -22,6 +22,9 @@ struct CsvSeries {
   std::string error;               ///< With the line and what to do; empty when all was read.
 };
 
+/// The names of a table's columns behind that of the dates; none when it has no first line.
+std::vector<std::string> CsvColumns(std::string_view text);
+
 /// Reads one column by its name (in any case), or the only one when the name is empty. Cells stand between semicolons,
 /// tabs or commas, whichever the first line shows, and may be quoted as RFC 4180 says. Dates are ISO 8601: 2000-01-31,
 /// with a time as 12:00 or 12:00:30 behind a blank or T. They must ascend. Decimals stand behind a point, or a comma
