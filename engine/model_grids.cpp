@@ -8,7 +8,7 @@
 
 #include "platform/datafile_writer.h"
 #include "platform/grid_files.h"
-#include "platform/grid_resample.h"
+#include "platform/grid_resampling.h"
 
 namespace tervane {
 
@@ -16,6 +16,22 @@ namespace {
 
 /// The share of a run that the making of grids takes, in percent.
 constexpr int kBegin = 10, kEnd = 90;
+
+/// The values of a grid on the model's cells, in one plane with it; kDeleteValue where it has none. "" or why not.
+std::string PutOnModel(const CTvn2DOrthoRotatedGridData& source, const GridGeometry& model, bool areCodes,
+                       std::vector<float>& values) {
+  ResamplingTask task;
+  task.raster = FileGeometryOf(source.Geometry());
+  task.grid = model;
+  task.read = [&source](const CellWindow& window, std::span<float> part) {
+    auto value = part.begin();
+    for (int j = window.j; j < window.j + window.ny; ++j)
+      for (int i = window.i; i < window.i + window.nx; ++i)
+        *value++ = source.IsEmptyValue(source.Value(i, j)) ? kDeleteValue : source.Value(i, j);
+    return std::string();
+  };
+  return Resample(task, SuitableResampling(task, areCodes), values);
+}
 
 }  // namespace
 
@@ -46,12 +62,15 @@ bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, EngineLog& l
       return false;
     }
     const bool isCode = grid.itemType == kCodeItemType;
-    std::vector<float> values =
-        Resample(source, domain.Geometry(), isCode ? Resampling::Nearest : Resampling::Bilinear);
+    std::vector<float> values;
+    if (const std::string problem = PutOnModel(source, domain.Geometry(), isCode, values); !problem.empty()) {
+      log.Error(grid.place, problem);
+      return false;
+    }
     std::size_t missing = 0;
     for (std::size_t cell = 0; cell < values.size(); ++cell) {
       const bool isInside = !domain.IsEmptyValue(domain.Values()[cell]);
-      if (!isInside || values[cell] == kUsualDeleteValue) {
+      if (!isInside || values[cell] == kDeleteValue) {
         values[cell] = kDeleteValue;
         missing += isInside;
       }
