@@ -3,6 +3,7 @@
 
 // Controls over data files and shape files: a name that may be typed, and a selector that shows what a file holds and
 // refuses with the reason what its node has no use for.
+#include <algorithm>
 #include <array>
 
 #include <fmt/format.h>
@@ -92,6 +93,18 @@ bool BrowseShapeFile(CData2DShpFile& node, Host::FileQuestion question, Host& ho
   return true;
 }
 
+/// An attribute that a file of a typed name does not have gives way to the first that will do.
+void ChooseAttribute(CData2DShpFile& node) {
+  CYbShapeData shapes;
+  const std::string path = node.File.Absolute();
+  if (!shapes.ReadShapeAndDbfFile(path, "").Ok()) return;
+  const std::string chosen = node.Attribute();
+  if (std::ranges::any_of(shapes.Fields(), [&](const ShapeField& field) { return field.name == chosen; })) return;
+  const auto usable = std::ranges::find_if(
+      shapes.Fields(), [&](const ShapeField& field) { return CheckShapeFile(path, node.Request(), field.name).Ok(); });
+  node.Choose(node.File, usable == shapes.Fields().end() ? std::string() : usable->name);
+}
+
 }  // namespace
 
 Control& PageForm::DataFile(std::string label, DataFileNode& file) {
@@ -113,6 +126,12 @@ Control& PageForm::ShapeFile(std::string label, CData2DShpFile& file) {
   Control& control = File(std::move(label), file.File);
   control.node = &file;
   control.key = "FILE_NAME";
+  control.enter = [&file, enter = std::move(control.enter)](const std::string& typed) {
+    const std::string before = file.File.Text();
+    std::string expected = enter(typed);
+    if (expected.empty() && file.File.Text() != before) ChooseAttribute(file);
+    return expected;
+  };
   control.browse = [&file, &control](Host& host) { return BrowseShapeFile(file, control.fileQuestion, host); };
   return control;
 }

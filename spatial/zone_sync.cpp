@@ -52,12 +52,15 @@ std::string ContentOf(CYbSEKvfBase& item) {
 }
 
 /// Whether a user has worked on an item: it differs from one that was just made.
-bool IsEdited(CFMSEKvfBase& owner, CFMSEKvfGroupBase& item, bool areCodes) {
+bool IsEdited(CFMSEKvfBase& owner, CFMSEKvfGroupBase& item) {
   const std::shared_ptr<CFMSEKvfGroupBase> fresh = owner.CreateStationItem();
-  SetIdentity(*fresh, item.GetStationId(), TitleOf(item.GetStationId(), areCodes));
-  if (ContentOf(item) == ContentOf(*fresh)) return false;
-  SetIdentity(*fresh, item.GetStationId(), "Global");
-  return ContentOf(item) != ContentOf(*fresh);
+  const std::string content = ContentOf(item), id = item.GetStationId();
+  // It may have been made for a source of another kind than the present one.
+  for (const std::string& title : {TitleOf(id, true), TitleOf(id, false), std::string("Global")}) {
+    SetIdentity(*fresh, id, title);
+    if (content == ContentOf(*fresh)) return false;
+  }
+  return true;
 }
 
 void RemoveAll(CFMSEKvfBase& owner, const std::vector<CFMSEKvfGroupBase*>& items) {
@@ -175,7 +178,7 @@ SyncPlan PlanSync(CFMSEKvfBase& owner, const FoundZones& found) {
   plan.added = std::move(matching.added);
   plan.removed = std::move(matching.removed);
   for (CFMSEKvfGroupBase* item : plan.removed)
-    if (IsEdited(owner, *item, found.areCodes)) plan.editedRemoved.push_back(item);
+    if (IsEdited(owner, *item)) plan.editedRemoved.push_back(item);
   return plan;
 }
 
@@ -183,7 +186,7 @@ SyncPlan PlanGlobalItem(CFMSEKvfBase& owner) {
   SyncPlan plan;
   plan.removed = ZoneItems(owner);
   for (CFMSEKvfGroupBase* item : plan.removed)
-    if (IsEdited(owner, *item, true)) plan.editedRemoved.push_back(item);
+    if (IsEdited(owner, *item)) plan.editedRemoved.push_back(item);
   return plan;
 }
 

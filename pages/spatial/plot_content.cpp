@@ -199,6 +199,34 @@ Control& UnitKeyChoice(PageForm& form, const std::string& label, const char* key
       .Key(key);
 }
 
+Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& owner) {
+  return form
+      .Choice(
+          "Fill Gaps with:",
+          [&filler, &owner] {
+            const std::vector<std::string> names = ZoneItemTitles(owner);
+            return static_cast<int>(std::ranges::find(names, filler) - names.begin());
+          },
+          [&filler, &owner](int choice) {
+            const std::vector<std::string> names = ZoneItemTitles(owner);
+            if (choice >= 0 && choice < static_cast<int>(names.size()))
+              filler = names[static_cast<std::size_t>(choice)];
+          },
+          [&filler, &owner] {
+            std::vector<std::string> options = ZoneItemTitles(owner);
+            // A name that nobody bears stands behind the others until another one is chosen.
+            if (std::ranges::find(options, filler) == options.end())
+              options.push_back(filler.empty() ? filler : filler + " (not in the list)");
+            return options;
+          })
+      .Key("ShapeGapFillName");
+}
+
+void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner) {
+  const std::vector<std::string> names = ZoneItemTitles(owner);
+  if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
+}
+
 int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const std::function<SyncResult()>& sync) {
   if (!found.unreadable.empty()) {
     host.Tell(fmt::format("{}\n\nThe zones stay as they are.", found.unreadable), Host::Icon::Warning);

@@ -27,6 +27,11 @@ SeriesContent FileChart(const DataFileNode& file);
 /// The units of an item type as a choice list over the key that a setup stores.
 Control& UnitKeyChoice(PageForm& form, const std::string& label, const char* key, int& unitKey, int itemType);
 
+/// Which zone or station of `owner` fills the gaps between polygons.
+Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& owner);
+/// Where nobody bears that name, the first fills them.
+void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner);
+
 /// Brings zones or stations in step with a source, asking before work of the user's would be lost. Gives the hints of
 /// what changed; `sync` does it.
 int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const std::function<SyncResult()>& sync);

@@ -2,8 +2,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/spatial/station_pages.h"
 
-#include <algorithm>
-
 #include <fmt/format.h>
 
 #include "pages/spatial/create_dialogs.h"
@@ -74,9 +72,7 @@ int C2DStationBasedDataDlg::Sync() {
   C2DStationBasedDataKvf& n = Node();
   const FoundZones found = n.FindStations();
   const int hint = SyncOrAsk(Outside(), found, n.PlanStations(found), [&] { return n.SyncStations(found); });
-  const std::vector<std::string> names = n.GetStationNames();
-  std::string& filler = n.Stations().ShapeGapFillName;
-  if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
+  KeepGapFill(n.Stations().ShapeGapFillName, n);
   return hint;
 }
 
@@ -140,21 +136,7 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
   form.Shown("Item Name:", [&n] { return n.Stations().ShapeFile().Attribute(); }).ShownWhen(byPolygons);
   UnitKeyChoice(form, "Unit of X- and Y-axes", "ShapeAxisUnit", n.Stations().ShapeAxisUnit, kCoordinateItemType)
       .ShownWhen(byPolygons);
-  form.Choice(
-          "Fill Gaps with:",
-          [&n] {
-            const std::vector<std::string> names = n.GetStationNames();
-            const auto found = std::ranges::find(names, n.Stations().ShapeGapFillName);
-            return found == names.end() ? -1 : static_cast<int>(found - names.begin());
-          },
-          [&n](int choice) {
-            const std::vector<std::string> names = n.GetStationNames();
-            if (choice >= 0 && choice < static_cast<int>(names.size()))
-              n.Stations().ShapeGapFillName = names[static_cast<std::size_t>(choice)];
-          },
-          [&n] { return n.GetStationNames(); })
-      .Key("ShapeGapFillName")
-      .ShownWhen(byPolygons);
+  GapFillChoice(form, n.Stations().ShapeGapFillName, n).ShownWhen(byPolygons);
   form.DataFile("Fully Distribution File:", n.FullyDistributed().GridFile())
       .Filter(kGridFileFilter)
       .DefaultExtension("nds2")

@@ -2,8 +2,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/spatial/zone_pages.h"
 
-#include <algorithm>
-
 #include "pages/spatial/create_dialogs.h"
 #include "pages/spatial/plot_content.h"
 #include "pages/table_form.h"
@@ -36,10 +34,7 @@ int CSubcatchmentDlg::Sync() {
   CodedZonesKvf& n = Node();
   const FoundZones found = n.FindZones();
   const int hint = SyncOrAsk(Outside(), found, n.PlanZones(found), [&] { return n.SyncZones(found); });
-  // The zone that fills gaps is one of those that are there.
-  const std::vector<std::string> titles = n.GetZoneTitles();
-  if (!titles.empty() && std::ranges::find(titles, n.ShapeGapFillName) == titles.end())
-    n.ShapeGapFillName = titles.front();
+  KeepGapFill(n.ShapeGapFillName, n);
   return hint;
 }
 
@@ -81,21 +76,7 @@ void CSubcatchmentDlg::Describe(PageForm& form) {
   form.Shown("Item Name:", [&n] { return n.ShapeFile().Attribute(); }).ShownWhen(byPolygons);
   UnitKeyChoice(form, "Units of X- and Y-axises:", "ShapeAxisUnit", n.ShapeAxisUnit, kCoordinateItemType)
       .ShownWhen(byPolygons);
-  form.Choice(
-          "Fill Gaps with:",
-          [&n] {
-            const std::vector<std::string> titles = n.GetZoneTitles();
-            const auto found = std::ranges::find(titles, n.ShapeGapFillName);
-            return found == titles.end() ? -1 : static_cast<int>(found - titles.begin());
-          },
-          [&n](int choice) {
-            const std::vector<std::string> titles = n.GetZoneTitles();
-            if (choice >= 0 && choice < static_cast<int>(titles.size()))
-              n.ShapeGapFillName = titles[static_cast<std::size_t>(choice)];
-          },
-          [&n] { return n.GetZoneTitles(); })
-      .Key("ShapeGapFillName")
-      .ShownWhen(byPolygons);
+  GapFillChoice(form, n.ShapeGapFillName, n).ShownWhen(byPolygons);
   form.Map([this] {
         MapContent map = ZoneMap(Node(), nullptr);
         map.picked = [this](const MapPick& pick) {

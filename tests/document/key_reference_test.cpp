@@ -38,6 +38,22 @@ section Subcatchments {
     }
   }
 }
+section Climate {
+  section PrecipitationRate {
+    section STATION_BASED {
+      NO_TIMESERIES = 1
+    }
+    section TIME_SERIES_1 {
+    }
+  }
+  section POTEVAPTRANS {
+    section STATION_BASED {
+      NO_TIMESERIES = 1
+    }
+    section TIME_SERIES_1 {
+    }
+  }
+}
 section ExtraParams {
   NoOfParams = 2
   section ExtraParam_1 {
@@ -75,7 +91,7 @@ bool IsDerived(const std::string& key) {
   for (const char* derived :
        {"IsDataUsedInSetup", "FlowModelDocVersion:Version", "YbSEKvfListItemCount",
         // Counts 0 or 1 instead of 2 items, the others are then unread.
-        "ExtraParams:NoOfParams", "Subcatchments:NO_ZONES", "Riverlinks:Noofreaches", "ITEM_COUNT",
+        "ExtraParams:NoOfParams", "Subcatchments:NO_ZONES", "Riverlinks:Noofreaches", "NO_TIMESERIES", "ITEM_COUNT",
         // Of the zone's identity and place.
         ":GRIDCODE", "ProfileSecNumber",
         // A kind of value that the file's value has not.
@@ -158,6 +174,9 @@ TEST(KeyReference, TellsInWhichVersionsAnOldKeyIsRead) {
   EXPECT_EQ(find("SimSpec/CompControlParaTimeStep", "MaxAllowedOLTimeStep").since, 10);
   EXPECT_EQ(find("ExtraParams/ExtraParam_%d", "Name").type, "string");
   EXPECT_EQ(find("SimSpec/SimulationPeriod", "SIMSTART").type, "date");
+  // Stations and zones are known though a new setup has none.
+  EXPECT_EQ(find("Climate/PrecipitationRate/TIME_SERIES_%d", "Elevation").type, "float");
+  EXPECT_EQ(find("Climate/SNOWMELTCONST", "Threshold").until, 10);
 }
 
 }  // namespace

@@ -48,6 +48,37 @@ section ModelCompWQ {
 section ModelCompPT {
   InitLocationRadio = 1
 }
+section Climate {
+  SM = 1
+  CorrectPrecipitation = 1
+  CorrectAirTemperature = 1
+  IncludeSolarRadiation = 1
+  section PrecipitationRate {
+    DistributionType = 2
+    section STATION_BASED {
+      NO_TIMESERIES = 1
+      TYPE = 2
+    }
+    section TIME_SERIES_1 {
+      NAME = "Sion"
+      GRIDCODEID = "131"
+      TYPE = 1
+      FIXED_VALUE = 1.5f
+      Elevation = 482f
+    }
+  }
+  section POTEVAPTRANS {
+    DistributionType = 3
+  }
+  section AirTemperature {
+    section GLOBAL {
+      TYPE = 2
+    }
+  }
+  section SNOWMELTCONST {
+    ThermalMelt = 1
+  }
+}
 section ExtraParams {
   NoOfParams = 2
   section ExtraParam_1 {
