@@ -110,20 +110,19 @@ bool Preprocessor::Run() {
 bool Preprocessor::CheckSetup() {
   WalkNodes(document_.Root(), [&](const NodePlace& place) {
     if (!place.takesPart) return;
-    bool isFaulty = false;
+    // A period that is not covered is a warning to who edits, and an end to who computes.
+    const auto* file = dynamic_cast<const DataFileNode*>(&place.node);
+    const bool isNeeded = file && file->FileUsed;
+    const std::string problem =
+        isNeeded ? WhyNotMet(file->File.Absolute(), file->Items, file->SelectionRequest()) : std::string();
+    if (!problem.empty()) return log_.Error(place.path + ":FILE_NAME", problem);
     for (const Finding& finding : place.node.Findings()) {
       const std::string where = PlaceOf(place.path, finding);
       if (finding.severity == Severity::Error)
         log_.Error(where, WithDetail(finding));
       else
         log_.Warning(where, WithDetail(finding));
-      isFaulty = isFaulty || finding.severity == Severity::Error;
     }
-    // A period that is not covered is a warning to who edits, and an end to who computes.
-    const auto* file = dynamic_cast<const DataFileNode*>(&place.node);
-    if (isFaulty || !file || !file->FileUsed) return;
-    const std::string problem = WhyNotMet(file->File.Absolute(), file->Items, file->SelectionRequest());
-    if (!problem.empty()) log_.Error(place.path + ":FILE_NAME", problem);
   });
   return log_.Errors() == 0;
 }
