@@ -13,6 +13,7 @@
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
+#include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -35,9 +36,7 @@ class EngineRun : public testing::Test {
     Domain().Type = CCatchmentKvf::kGridFile;
   }
   void WriteGrid(const std::string& name, const GridGeometry& geometry, std::vector<float> values, int itemType) {
-    CTvn2DOrthoRotatedGridData grid;
-    ASSERT_EQ(grid.TakeValues(geometry, std::move(values), kEmpty, 0, itemType), "");
-    ASSERT_EQ(WriteGridData(folder.File(name), grid).error, "");
+    test::WriteGrid(folder.File(name), geometry, std::move(values), itemType);
   }
   CCatchmentKvf& Domain() { return *document.Root().Important<CCatchmentKvf>("CATCHMENT"); }
   CTopographyKvf& Topography() { return *document.Root().Important<CTopographyKvf>("TOPOGRAPHY"); }
@@ -106,6 +105,30 @@ TEST_F(EngineRun, TellsCellsWithoutValueAndZonesByName) {
   ASSERT_EQ(Run("/PP"), kEngineDone) << log;
   EXPECT_THAT(log, HasSubstr("warning: Subcatchments: 7 cells of the domain have no Subcatchments"));
   EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("8, Upper valley: 0.03 km2"));
+}
+
+/// A real catchment with stations, snow and zones.
+TEST(EngineRunExample, ReportsTheRhone) {
+  test::TempFolder folder;
+  std::filesystem::copy(std::string(TERVANE_SOURCE_DIR) + "/examples/rhone", folder.Path(),
+                        std::filesystem::copy_options::recursive);
+  std::ostringstream out;
+  ASSERT_EQ(RunEngine({folder.File("rhone.tvd"), "/PP"}, out), kEngineDone) << out.str();
+  EXPECT_THAT(out.str(), Not(HasSubstr("warning")));
+  const std::string report = test::ReadFile(folder.File("rhone_results/rhone_PreProcessed.kvf"));
+  for (const char* expected : {"Model Domain and Grid: 5285 km2 in 5285 cells", "Topography: 374.216 m to 4292.8 m",
+                               "Precipitation Rate: 5285 km2", "45, Gauge 45: ", "TITLE = \"Gauge 262\"",
+                               "Filename = file \"../temperature.nds0\"", "StartDate = 2012, 1, 1, 0, 0, 0"})
+    EXPECT_THAT(report, HasSubstr(expected));
+
+  std::ostringstream faults;
+  EXPECT_EQ(RunEngine({folder.File("rhone_faults.tvd"), "/PP"}, faults), kEngineFailed);
+  for (const char* expected :
+       {"error: Topography/NDS_2D_DATA_FILE:FILE_NAME: cannot read", "error: Climate:SM: The snowmelt model",
+        "TIME_SERIES_50/TIME_SERIES_FILE:FILE_NAME: the file covers 2012-01-01 to 2016-01-01",
+        "AirTemperature/GLOBAL/TIME_SERIES_FILE:FILE_NAME: item 1 is Precipitation Rate"})
+    EXPECT_THAT(faults.str(), HasSubstr(expected));
+  EXPECT_FALSE(FileExists(folder.File("rhone_faults_results/rhone_faults_PreProcessed.kvf")));
 }
 
 TEST_F(EngineRun, RefusesWhatItCannotDo) {

@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-#include "platform/grid_files.h"
+#include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -38,9 +38,7 @@ TEST(Domain, TellsWhatIsWrongWithItsFile) {
     if (c.values.empty()) {
       folder.Write("domain.nds2", "no data file");
     } else {
-      CTvn2DOrthoRotatedGridData grid;
-      ASSERT_EQ(grid.TakeValues({2, 1, 100, 0, 0, 0, c.projection}, c.values, kUsualDeleteValue, 0, kCodeItemType), "");
-      ASSERT_EQ(WriteGridData(folder.File("domain.nds2"), grid).error, "");
+      test::WriteGrid(folder.File("domain.nds2"), {2, 1, 100, 0, 0, 0, c.projection}, c.values, kCodeItemType);
     }
     CFlowModelDoc document;
     auto& domain = *document.Root().Important<CCatchmentKvf>("CATCHMENT");

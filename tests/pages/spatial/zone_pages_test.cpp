@@ -4,8 +4,8 @@
 
 #include <gmock/gmock.h>
 
-#include "platform/grid_files.h"
 #include "simspec/model_components.h"
+#include "tests/support/data_files.h"
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -22,9 +22,7 @@ using Row = std::optional<int>;
 class ZonePage : public testing::Test {
  protected:
   void WriteGrid(const std::string& name, std::vector<float> values, int itemType) {
-    CTvn2DOrthoRotatedGridData grid;
-    ASSERT_EQ(grid.TakeValues({2, 1, 100, 0, 0, 0, {}}, std::move(values), kUsualDeleteValue, 0, itemType), "");
-    ASSERT_EQ(WriteGridData(folder.File(name), grid).error, "");
+    test::WriteGrid(folder.File(name), {2, 1, 100, 0, 0, 0, {}}, std::move(values), itemType);
   }
   std::vector<std::string> Titles() { return zones.GetZoneTitles(); }
 
