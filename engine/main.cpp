@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <iostream>
 
-#include "engine/engine_run.h"
+#include "engine/engine_program.h"
 
 int main(int argc, char** argv) {
-  return tervane::RunEngine(std::vector<std::string>(argv + 1, argv + argc), std::cout);
+  return tervane::RunEngineProgram(std::vector<std::string>(argv + 1, argv + argc), std::cout);
 }

@@ -81,7 +81,7 @@ FileResult MeanOfSteps(const std::string& path, int number, const CYbDateTime& s
 
 }  // namespace
 
-Preprocessor::Preprocessor(CFlowModelDoc& document, EngineLog& log)
+Preprocessor::Preprocessor(CFlowModelDoc& document, RunLog& log)
     : document_(document),
       log_(log),
       catchment_(document.Root().Important<CCatchmentKvf>("CATCHMENT")),

@@ -1,12 +1,12 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "engine/engine_run.h"
+#include "engine/engine_program.h"
 
 #include <fmt/format.h>
 
 #include "document/flow_model_document.h"
-#include "engine/engine_log.h"
 #include "engine/preprocessor.h"
+#include "engine/run_log.h"
 #include "execution/execute_flags.h"
 #include "simspec/model_components.h"
 
@@ -31,8 +31,8 @@ Tasks TasksOf(const std::string& option, const CFlowModelDoc& document) {
 
 }  // namespace
 
-EngineStatus RunEngine(const std::vector<std::string>& arguments, std::ostream& out) {
-  EngineLog log(out);
+EngineStatus RunEngineProgram(const std::vector<std::string>& arguments, std::ostream& out) {
+  RunLog log(out);
   std::string setup, option;
   for (const std::string& argument : arguments) {
     const bool isOption = argument == "/PP" || argument == "/WM" || argument == "/WQ";

@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "engine/engine_run.h"
+#include "engine/engine_program.h"
 
 #include <sstream>
 
@@ -27,9 +27,9 @@ using testing::Not;
 constexpr float kEmpty = kUsualDeleteValue;
 
 /// A setup of 4 by 4 cells of 100 m at (1000, 2000); the domain leaves the two northern corners out.
-class EngineRun : public testing::Test {
+class EngineProgram : public testing::Test {
  protected:
-  EngineRun() {
+  EngineProgram() {
     WriteGrid("domain.nds2", {4, 4, 100, 1000, 2000, 0, {}}, {2, 2, 2, 2, 2, 1, 1, 2, 2, 1, 1, 2, kEmpty, 2, 2, kEmpty},
               kCodeItemType);
     Domain().GridFile().Choose(FileName("domain.nds2", folder.Path()));
@@ -46,7 +46,7 @@ class EngineRun : public testing::Test {
     std::ostringstream out;
     std::vector<std::string> arguments{folder.File("a.tvd")};
     if (!option.empty()) arguments.push_back(option);
-    const EngineStatus status = RunEngine(arguments, out);
+    const EngineStatus status = RunEngineProgram(arguments, out);
     log = out.str();
     return status;
   }
@@ -64,7 +64,7 @@ class EngineRun : public testing::Test {
   std::string log;
 };
 
-TEST_F(EngineRun, PutsQuantitiesOnTheCellsOfTheDomain) {
+TEST_F(EngineProgram, PutsQuantitiesOnTheCellsOfTheDomain) {
   // Half the cell size, so that a model cell's centre is a corner of four; the plane rises by 1 a metre to the east.
   std::vector<float> plane;
   for (int j = 0; j < 8; ++j)
@@ -93,7 +93,7 @@ TEST_F(EngineRun, PutsQuantitiesOnTheCellsOfTheDomain) {
   kvfClose(&report);
 }
 
-TEST_F(EngineRun, TellsCellsWithoutValueAndZonesByName) {
+TEST_F(EngineProgram, TellsCellsWithoutValueAndZonesByName) {
   WriteGrid("codes.nds2", {2, 4, 100, 1000, 2000, 0, {}}, {5, 5, 5, 5, 8, 8, 8, 8}, kCodeItemType);
   document.Root().Important<CModelCompKvf>("MODELCOMP")->OL_ModelType = 1;
   auto& zones = *document.Root().Important<CSubcatchmentKvf>("SUBCATCHMENT");
@@ -108,12 +108,12 @@ TEST_F(EngineRun, TellsCellsWithoutValueAndZonesByName) {
 }
 
 /// A real catchment with stations, snow and zones.
-TEST(EngineRunExample, ReportsTheRhone) {
+TEST(EngineProgramExample, ReportsTheRhone) {
   test::TempFolder folder;
   std::filesystem::copy(std::string(TERVANE_SOURCE_DIR) + "/examples/rhone", folder.Path(),
                         std::filesystem::copy_options::recursive);
   std::ostringstream out;
-  ASSERT_EQ(RunEngine({folder.File("rhone.tvd"), "/PP"}, out), kEngineDone) << out.str();
+  ASSERT_EQ(RunEngineProgram({folder.File("rhone.tvd"), "/PP"}, out), kEngineDone) << out.str();
   EXPECT_THAT(out.str(), Not(HasSubstr("warning")));
   const std::string report = test::ReadFile(folder.File("rhone_results/rhone_PreProcessed.kvf"));
   for (const char* expected : {"Model Domain and Grid: 5285 km2 in 5285 cells", "Topography: 374.216 m to 4292.8 m",
@@ -122,7 +122,7 @@ TEST(EngineRunExample, ReportsTheRhone) {
     EXPECT_THAT(report, HasSubstr(expected));
 
   std::ostringstream faults;
-  EXPECT_EQ(RunEngine({folder.File("rhone_faults.tvd"), "/PP"}, faults), kEngineFailed);
+  EXPECT_EQ(RunEngineProgram({folder.File("rhone_faults.tvd"), "/PP"}, faults), kEngineFailed);
   for (const char* expected :
        {"error: Topography/NDS_2D_DATA_FILE:FILE_NAME: cannot read", "error: Climate:SM: The snowmelt model",
         "TIME_SERIES_50/TIME_SERIES_FILE:FILE_NAME: the file covers 2012-01-01 to 2016-01-01",
@@ -131,7 +131,7 @@ TEST(EngineRunExample, ReportsTheRhone) {
   EXPECT_FALSE(FileExists(folder.File("rhone_faults_results/rhone_faults_PreProcessed.kvf")));
 }
 
-TEST_F(EngineRun, RefusesWhatItCannotDo) {
+TEST_F(EngineProgram, RefusesWhatItCannotDo) {
   auto& flags = *document.Root().Important<CExecuteEngineFlagsKvf>("EXECUTE_ENGINE_FLAGS");
   struct Case {
     const char* what;

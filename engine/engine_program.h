@@ -14,6 +14,6 @@ enum EngineStatus : int { kEngineDone = 0, kEngineFailed = 1, kEngineMisused = 2
 /// Runs a setup: `SETUP.tvd` and at most one of `/PP`, `/WM`, `/WQ`; without one the setup says itself what is run. All
 /// messages go to `out`. This engine preprocesses alone: a run that asks for more ends as failed, behind the
 /// preprocessing where that was asked.
-EngineStatus RunEngine(const std::vector<std::string>& arguments, std::ostream& out);
+EngineStatus RunEngineProgram(const std::vector<std::string>& arguments, std::ostream& out);
 
 }  // namespace tervane
