@@ -140,6 +140,8 @@ std::string RasterFile::Open(const std::string& path) {
     state->raster = loaded.module->Open(AbsoluteFromHere(path), stored, reason);
   }
   if (!state->raster) {
+    // The file was named already.
+    reason = Trimmed(Replaced(reason, AbsoluteFromHere(path) + ":", ""));
     return refused(reason.empty() ? "it is neither a data file nor a raster of a kind that is known here" : reason);
   }
   if (stored.bands.empty()) {
