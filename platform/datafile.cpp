@@ -25,13 +25,12 @@ namespace {
 /// Values that are converted at one time, small enough for the processor's cache.
 constexpr std::size_t kPiece = std::size_t{1} << 16;
 
-/// Whether a file is netCDF, by its first bytes; a classic one is whole as far as its header shows, else `reason` says
-/// what is wrong.
+/// Whether a file is netCDF, by its first bytes, or too short for anything else; `reason` says what is wrong with one
+/// that is not whole, as far as its header shows.
 bool IsNetcdf(const std::string& path, std::string& reason) {
   bool isClassic = false;
   reason = netcdf::WhyClassicFileIsBad(path, isClassic);
-  if (isClassic) return true;
-  reason.clear();
+  if (isClassic || !reason.empty()) return true;
   std::error_code error;
   os::File file = os::File::OpenForReading(path, error);
   std::array<char, 8> begin{};

@@ -252,7 +252,8 @@ Resampling SuitableResampling(const ResamplingTask& task, bool areCodes) {
   const Places places(task);
   if (AreCellsTheSame(task, places)) return Resampling::CellForCell;
   if (areCodes) return Resampling::Nearest;
-  return CellsAcross(places, task.grid) >= 2 ? Resampling::Average : Resampling::Bilinear;
+  constexpr double kTwo = 2 - 1e-6;
+  return CellsAcross(places, task.grid) >= kTwo ? Resampling::Average : Resampling::Bilinear;
 }
 
 std::string Resample(const ResamplingTask& task, Resampling method, std::vector<float>& values) {

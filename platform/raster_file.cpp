@@ -26,11 +26,13 @@ struct LoadedModule {
   std::string problem;
 };
 
-/// Loads the module from the program's folder or, as on systems with /usr/bin and /usr/lib, from the one beside it.
+/// Loads the module from the program's folder; for an engine from the one above it, where the programs are, and for a
+/// test of the build from theirs.
 LoadedModule LoadRasterModule() {
   const std::string name = os::SharedLibraryName(raster::kModuleName);
   const std::string folder = os::ProgramFolder();
-  for (const std::string& path : {folder + "/" + name, folder + "/../lib/" + name}) {
+  for (const char* place : {"/", "/../", "/../bin/"}) {
+    const std::string path = folder + place + name;
     if (!FileExists(path)) continue;
     std::string reason;
     void* const library = os::LoadSharedLibrary(path, reason);
@@ -138,6 +140,8 @@ std::string RasterFile::Open(const std::string& path) {
     state->raster = loaded.module->Open(AbsoluteFromHere(path), stored, reason);
   }
   if (!state->raster) {
+    // The file was named already.
+    reason = Trimmed(Replaced(reason, AbsoluteFromHere(path) + ":", ""));
     return refused(reason.empty() ? "it is neither a data file nor a raster of a kind that is known here" : reason);
   }
   if (stored.bands.empty()) {

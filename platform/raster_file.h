@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 // Rasters of other programs: what GDAL reads (GeoTIFF, ASCII grids, ...) in our form, and grids written as GeoTIFF.
-// GDAL stands in a module that is loaded when it is first needed, from the program's folder or from `../lib`.
+// GDAL stands in a module beside the programs, which is loaded when it is first needed.
 #pragma once
 
 #include <memory>

@@ -6,7 +6,10 @@
 #include <rapidjson/document.h>
 
 #include "cli/command_line.h"
+#include "platform/cart.h"
 #include "platform/datafile_writer.h"
+#include "platform/grid_files.h"
+#include "platform/text.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {
@@ -14,7 +17,10 @@ namespace {
 
 using test::ReadFile;
 using test::TempFolder;
+using testing::FloatEq;
 using testing::HasSubstr;
+using testing::Not;
+using testing::Pointwise;
 
 struct Outcome {
   int status;
@@ -99,6 +105,17 @@ TEST(DataCommands, ASeriesGoesFromATableToADataFileAndBack) {
   EXPECT_EQ(values[0], 15);
 }
 
+TEST(DataCommands, EachColumnBecomesAnItem) {
+  const TempFolder folder;
+  const std::string csv = folder.Write("in.csv", "t,a,b,c\n2000-01-01,1,10,100\n2000-01-02,2,20,200\n");
+  const std::string out = folder.File("a.nds0"), back = folder.File("back.csv");
+  EXPECT_EQ(Tervane({"import", "series", csv, "--column", "c", "--column", "a", out, "--item", "999"}).status, kDone);
+  EXPECT_EQ(Tervane({"export", out, back}).status, kDone);
+  EXPECT_EQ(ReadFile(back), "time,\"c\",\"a\"\n2000-01-01 00:00:00,100,1\n2000-01-02 00:00:00,200,2\n");
+  const Outcome all = Tervane({"import", "series", csv, out, "--item", "999", "--all-columns", "--force"});
+  EXPECT_THAT(all.out, HasSubstr("3 items, 2 steps"));
+}
+
 TEST(DataCommands, AnImportThatIsRefusedWritesNothing) {
   const TempFolder folder;
   const std::string csv = folder.Write("in.csv", "t,a\n2000-01-01,1\n"), out = folder.File("a.nds0");
@@ -126,6 +143,156 @@ TEST(DataCommands, AnImportThatIsRefusedWritesNothing) {
   folder.Write("a.nds0", "mine");
   EXPECT_THAT(Tervane({"import", "series", csv, out, "--item", "100182"}).err, HasSubstr("--force"));
   EXPECT_EQ(ReadFile(out), "mine");
+}
+
+constexpr const char* kRaster =
+    "ncols 4\nnrows 2\nxllcorner 100\nyllcorner 200\ncellsize 50\nNODATA_value -9\n1 2 3 4\n5 6 -9 8\n";
+
+TEST(DataCommands, ARasterGoesToADataFileAndBack) {
+  const TempFolder folder;
+  const std::string grid = folder.File("a.nds2"), tif = folder.File("a.tif"), again = folder.File("b.nds2");
+  const std::string raster = folder.Write("in.asc", kRaster);
+  const Outcome imported = Tervane({"import", "grid", raster, grid, "--item", "100180"});
+  EXPECT_EQ(imported.status, kDone) << imported.err;
+  EXPECT_THAT(imported.err, HasSubstr("it names no unit: its values are taken as meter"));
+  EXPECT_EQ(imported.out, grid + ": grid 4 x 2 of Elevation in meter, 7 values, 1 empty\n");
+
+  CTvn2DOrthoRotatedGridData before, after;
+  ASSERT_EQ(ReadGridData(grid, 1, before).error, "");
+  EXPECT_EQ(before.Values(), (std::vector<float>{5, 6, kUsualDeleteValue, 8, 1, 2, 3, 4}));
+  for (const double rotation : {0.0, 30.0, -72.5}) {
+    SCOPED_TRACE(rotation);
+    ASSERT_EQ(before.TakeValues({4, 2, 50, 100, 200, rotation, "EPSG:32632"}, std::vector(before.Values()),
+                                kUsualDeleteValue, 1003, 100180),
+              "");
+    before.SetItemName("Ground");
+    ASSERT_EQ(WriteGridData(grid, before).error, "");
+    EXPECT_EQ(Tervane({"export", grid, tif, "--force"}).err, "");
+    const Outcome back = Tervane({"import", "grid", tif, again, "--item", "100180", "--force"});
+    EXPECT_EQ(back.err, "");
+    EXPECT_THAT(back.out, HasSubstr("in foot"));
+    ASSERT_EQ(ReadGridData(grid, 1, before).error, "");
+    ASSERT_EQ(ReadGridData(again, 1, after).error, "");
+    EXPECT_EQ(after.Values(), before.Values());
+    EXPECT_EQ(after.ItemName(), "Ground");
+    EXPECT_NEAR(after.Geometry().rotation, rotation, 1e-9);
+    EXPECT_NEAR(after.Geometry().x0, 100, 1e-9);
+    EXPECT_NEAR(after.Geometry().y0, 200, 1e-9);
+    EXPECT_TRUE(CYbMapProjection(after.Geometry().projection).IsSameAs(CYbMapProjection("EPSG:32632")));
+  }
+  EXPECT_THAT(Tervane({"export", grid, tif, "--item", "2", "--force"}).err, HasSubstr("there is no item 2"));
+  EXPECT_THAT(Tervane({"export", grid, tif, "--step", "2", "--force"}).err, HasSubstr("there is no step 2"));
+  EXPECT_THAT(Tervane({"export", grid, folder.File("a.csv"), "--step", "1"}).err, HasSubstr("give OUT the extension"));
+}
+
+TEST(DataCommands, ARasterIsPutOnTheModelGrid) {
+  const TempFolder folder;
+  const std::string setup = folder.File("a.tvd"), out = folder.File("a.nds2");
+  const std::string raster = folder.Write("in.asc", kRaster);
+  const std::string codes = folder.Write("codes.asc", Replaced(kRaster, "cellsize 50", "cellsize 49.9999"));
+  // Of more cells than can be held, of which the model needs few.
+  const std::string large = folder.Write(
+      "large.vrt",
+      "<VRTDataset rasterXSize=\"40000\" rasterYSize=\"20000\"><GeoTransform>100, 1, 0, 300, 0, -1</GeoTransform>"
+      "<VRTRasterBand dataType=\"Float32\" band=\"1\"/></VRTDataset>");
+  ASSERT_EQ(Tervane({"new", setup}).status, kDone);
+  const auto set = [&](const std::string& key, const std::string& value) {
+    EXPECT_EQ(Tervane({"set", setup, "Catchment:" + key, value}).err, "");
+  };
+  struct Row {
+    std::vector<std::string> arguments;
+    const char *cellSize, *method;
+    std::vector<float> expected;
+  };
+  const Row rows[] = {
+      {{raster, "--item", "100180", "--unit", "m"}, "50", "cell for cell", {5, 6, 1, 2}},
+      {{raster, "--item", "100180", "--unit", "km"}, "50", "cell for cell", {5000, 6000, 1000, 2000}},
+      {{raster, "--item", "100180", "--unit", "cm"}, "50", "cell for cell", {0.05f, 0.06f, 0.01f, 0.02f}},
+      {{raster, "--item", "100180"}, "100", "(average)", {3.5f, 5, kUsualDeleteValue, kUsualDeleteValue}},
+      {{raster, "--item", "100180", "--resample", "nearest"},
+       "100",
+       "(nearest)",
+       {2, 4, kUsualDeleteValue, kUsualDeleteValue}},
+      {{codes, "--item", "100370"}, "100", "(nearest)", {2, 4, kUsualDeleteValue, kUsualDeleteValue}},
+      {{codes, "--item", "999"}, "100", "(nearest)", {2, 4, kUsualDeleteValue, kUsualDeleteValue}},
+      {{large, "--item", "999"}, "50", "(average)", {0, 0, 0, 0}},
+  };
+  set("type", "2");
+  set("nxShp", "2");
+  set("nyShp", "2");
+  set("x0Shp", "100");
+  set("y0Shp", "200");
+  for (const Row& row : rows) {
+    SCOPED_TRACE(row.method);
+    set("sizeShp", row.cellSize);
+    std::vector<std::string> arguments{"import", "grid", out, "--like", setup, "--force"};
+    arguments.insert(arguments.begin() + 2, row.arguments.begin(), row.arguments.end());
+    const Outcome outcome = Tervane(arguments);
+    EXPECT_EQ(outcome.status, kDone) << outcome.err;
+    EXPECT_THAT(outcome.out, HasSubstr(row.method));
+    EXPECT_THAT(outcome.err, Not(HasSubstr("projection")));
+    CTvn2DOrthoRotatedGridData grid;
+    ASSERT_EQ(ReadGridData(out, 1, grid).error, "");
+    EXPECT_THAT(grid.Values(), Pointwise(FloatEq(), row.expected));
+  }
+  set("MapProjShp", "EPSG:32632");
+  EXPECT_THAT(
+      Tervane({"import", "grid", raster, out, "--item", "999", "--like", setup, "--force"}).err,
+      HasSubstr("warning: the raster has no known projection, so that its coordinates are taken as WGS 84 / UTM"));
+}
+
+TEST(DataCommands, ARasterThatIsRefusedWritesNothing) {
+  const TempFolder folder;
+  const std::string raster = folder.Write("in.asc", Replaced(kRaster, "1 2 3 4", "1.5 2 3 4"));
+  const auto vrt = [&](const char* name, const char* place, const char* bands) {
+    return folder.Write(
+        name, std::string(R"(<VRTDataset rasterXSize="2" rasterYSize="2">)") + place + bands + "</VRTDataset>");
+  };
+  const char* const kBand = R"(<VRTRasterBand dataType="Float32" band="1"/>)";
+  const std::string bands =
+      vrt("bands.vrt", "<GeoTransform>0, 1, 0, 9, 0, -1</GeoTransform>",
+          R"(<VRTRasterBand dataType="Float32" band="1"><Description>dry</Description></VRTRasterBand>
+                                   <VRTRasterBand dataType="Float32" band="2"><UnitType>frogs</UnitType></VRTRasterBand>)");
+  const std::string flat = vrt("flat.vrt", "<GeoTransform>0, 2, 0, 9, 0, -1</GeoTransform>", kBand);
+  const std::string degrees =
+      vrt("degrees.vrt", "<SRS>EPSG:4326</SRS><GeoTransform>7, 1, 0, 47, 0, -1</GeoTransform>", kBand);
+  const std::string nowhere = vrt("nowhere.vrt", "", kBand);
+  const std::string noDomain = folder.File("no_domain.tvd"), elsewhere = folder.File("elsewhere.tvd");
+  ASSERT_EQ(Tervane({"new", noDomain}).status, kDone);
+  ASSERT_EQ(Tervane({"new", elsewhere}).status, kDone);
+  ASSERT_EQ(Tervane({"set", elsewhere, "Catchment:type", "2"}).status, kDone);
+  ASSERT_EQ(Tervane({"set", elsewhere, "Catchment:x0Shp", "9e6"}).status, kDone);
+  const std::string out = folder.Write("a.nds2", "mine");
+  struct Row {
+    std::vector<std::string> arguments;
+    const char* reason;
+  };
+  const Row rows[] = {
+      {{raster, "--item", "5"}, "there is no item type 5"},
+      {{raster, "--item", "100180", "--unit", "s"}, "\"s\" is no unit of Elevation"},
+      {{raster, "--item", "100180", "--band", "2"}, "there is no band 2, but 1 \"in\""},
+      {{raster, "--item", "100180", "--band", "0"}, "0"},
+      {{raster, "--item", "100370"}, "1.5 is no code"},
+      {{raster, "--item", "999", "--resample", "nearest"}, "--like"},
+      {{raster, "--item", "999", "--like", noDomain}, "the model domain: no file is chosen"},
+      {{raster, "--item", "999", "--like", elsewhere}, "it has no value within the model grid"},
+      {{bands, "--item", "999"}, "it has the bands 1 \"dry\", 2 \"bands 2\": tell which"},
+      {{bands, "--item", "100180", "--band", "2"}, "\"frogs\" is no known unit; name the right one"},
+      {{flat, "--item", "999"}, "its cells of 2 x 1 m are no squares"},
+      {{degrees, "--item", "999"}, "its cells are in degrees"},
+      {{nowhere, "--item", "999"}, "it has no place on the map"},
+      {{folder.File("none.tif"), "--item", "999"}, "it does not exist"},
+  };
+  for (const Row& row : rows) {
+    std::vector<std::string> arguments{"import", "grid"};
+    arguments.insert(arguments.end(), row.arguments.begin(), row.arguments.end());
+    arguments.insert(arguments.end(), {out, "--force"});
+    const Outcome outcome = Tervane(arguments);
+    EXPECT_EQ(outcome.status, kCouldNot);
+    EXPECT_THAT(outcome.err, HasSubstr(row.reason));
+    EXPECT_EQ(ReadFile(out), "mine");
+  }
+  EXPECT_THAT(Tervane({"import", "grid", raster, out, "--item", "999"}).err, HasSubstr("--force"));
 }
 
 }  // namespace

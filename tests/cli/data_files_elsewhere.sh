@@ -45,3 +45,13 @@ gdal_translate -q -of netCDF straight.nds2 foreign.nc
 expect "data info" "cells of 50 m from 500000, 6000000" "$("$tervane" data info foreign.nc 2>&1)"
 [ "$("$tervane" data stats foreign.nc 2>/dev/null | sed 's/.*: smallest/smallest/')" = \
   "$("$tervane" data stats straight.nds2 | sed 's/.*: smallest/smallest/')" ]
+
+# A turned grid as GeoTIFF: the corners, the missing values and the rows are where they were.
+"$tervane" export turned.nds2 turned.tif
+tif="$(gdalinfo turned.tif 2>&1)"
+expect "gdalinfo" "Driver: GTiff" "$tif"
+expect "gdalinfo" "1216.506, 2125.000" "$(tr -s ' ' <<<"$tif" | sed 's/( /(/g')"
+expect "gdalinfo" "NoData Value=-1e+30" "$tif"
+# Cell (2, 1) of the south is in the second row of three from the north as well; cell (0, 2) in the first.
+[ "$(gdallocationinfo -valonly turned.tif 2 1)" = 7 ]
+[ "$(gdallocationinfo -valonly turned.tif 0 0)" = 10 ]

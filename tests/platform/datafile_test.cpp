@@ -289,7 +289,7 @@ TEST(DataFile, WhatIsNoDataFileIsNamed) {
     const char* error;
   };
   const Row rows[] = {{"", "too short"},
-                      {"hello, world", "it is no netCDF file"},
+                      {"hello, world", "it is neither a data file nor a raster"},
                       {"CDF\x03" + std::string(40, '\0'), "known version"},
                       {"CDF\x01", "header is cut or damaged"},
                       {"CDF\x01" + std::string(28, '\xFF'), "header is cut or damaged"},
