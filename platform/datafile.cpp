@@ -211,12 +211,12 @@ class PieceReader {
   };
   /// Dimensions before `d` have a count of 1 each. Gives the status of the library; throws `Cancelled`.
   int Read(std::size_t d, Box box, std::span<float> values) {
-    if (values.size() <= kPiece || d == box.count.size()) return Get(box, values);
+    if (values.size() <= kAtOnce || d == box.count.size()) return Get(box, values);
     const std::size_t all = box.count[d], inner = values.size() / all;
-    std::size_t atOnce = std::max<std::size_t>(kPiece / inner, 1);
+    std::size_t atOnce = std::max<std::size_t>(kAtOnce / inner, 1);
     // A stored piece is unpacked as a whole, so that it should be asked for once.
-    if (!storage_.chunk.empty() && inner <= kPiece) atOnce = std::max(atOnce / Chunk(d) * Chunk(d), Chunk(d));
-    if (!storage_.chunk.empty() && inner > kPiece) atOnce = d + 2 == box.count.size() ? Chunk(d) : 1;
+    if (!storage_.chunk.empty() && inner <= kAtOnce) atOnce = std::max(atOnce / Chunk(d) * Chunk(d), Chunk(d));
+    if (!storage_.chunk.empty() && inner > kAtOnce) atOnce = d + 2 == box.count.size() ? Chunk(d) : 1;
     for (std::size_t done = 0; done < all; done += atOnce) {
       box.count[d] = std::min(atOnce, all - done);
       const std::span<float> piece = values.subspan(done * inner, box.count[d] * inner);
@@ -228,12 +228,14 @@ class PieceReader {
   }
 
  private:
+  static constexpr std::size_t kAtOnce = std::size_t{1} << 19;  ///< A millisecond, if the file is at hand.
+
   std::size_t Chunk(std::size_t d) const { return std::max<std::size_t>(storage_.chunk[d], 1); }
 
   int Get(const Box& box, std::span<float> values) {
     const std::size_t columns = box.count.empty() ? 1 : box.count.back();
     const std::size_t width = storage_.chunk.empty() ? columns : Chunk(box.count.size() - 1);
-    if (values.size() <= kPiece || width >= columns) return GetAtOnce(box, values);
+    if (values.size() <= kAtOnce || width >= columns) return GetAtOnce(box, values);
     // Wide rows of packed pieces, one piece after the other.
     Box part = box;
     std::vector<float> read;

@@ -6,12 +6,16 @@
 
 #include <string>
 
+#include "platform/computation.h"
 #include "platform/grid.h"
 #include "platform/grid_geometry.h"
 #include "platform/progress.h"
 #include "platform/shapes.h"
 
 namespace tervane {
+
+/// A grid that is read, interpolated or made of polygons.
+using ComputedGrid = Computed<CTvn2DOrthoRotatedGridData>;
 
 /// One grid of an item; steps and layers are counted from 0, layers from the bottom.
 struct GridSlice {
