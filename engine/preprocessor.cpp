@@ -23,9 +23,6 @@ namespace tervane {
 
 namespace {
 
-/// Threads of one interpolation.
-constexpr int kThreads = 2;
-
 std::string WithDetail(const Finding& finding) {
   return finding.detail.empty() ? finding.text : fmt::format("{} ({})", finding.text, finding.detail);
 }
@@ -215,9 +212,7 @@ void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
       const int unit = type ? BaseUnit(*type).key : kDimensionlessUnit;
       return {grid.SetGridData(geometry, value, kUsualDeleteValue, unit, itemType), {}};
     }
-    InterpolationOptions work;
-    work.threads = kThreads;
-    return BuildGrid(source, work, grid);
+    return BuildGrid(source, {}, grid);
   };
   ShowGrid({page.title, PathOf(quantity), itemType, std::move(make), {}, {}, {}}, page);
   if (&quantity != document_.Root().GetImportantNode("TOPOGRAPHY")) return;

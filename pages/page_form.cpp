@@ -291,9 +291,9 @@ std::string ShownValue(const Control& control) {
       return Replaced(fmt::format(" = {} of [{}]", shown, fmt::join(options, " | ")), "\n", " ");
     }
     case ControlKind::Map:
-      return " = " + Replaced(Summary(control.map()), "\n", "\\n");
+      return " = " + Replaced(Summary(Finished(control.map)), "\n", "\\n");
     case ControlKind::Chart:
-      return " = " + Replaced(Summary(control.chart()), "\n", "\\n");
+      return " = " + Replaced(Summary(Finished(control.chart)), "\n", "\\n");
     case ControlKind::Label:
     case ControlKind::Button:
     case ControlKind::Group:

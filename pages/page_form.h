@@ -162,7 +162,7 @@ class PageForm {
   Control& Shown(std::string label, std::function<std::string()> text);
   Control& Table(std::shared_ptr<TableForm> table);
   /// What it shows is asked for anew whenever the page is brought in step with its node, so it must be at hand: grids
-  /// and shapes are shared, not made for each call.
+  /// and shapes are shared, not made for each call, and what is not there yet is awaited.
   Control& Map(std::function<MapContent()> content);
   /// The same for a chart.
   Control& Chart(std::function<SeriesContent()> content);

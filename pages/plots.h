@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "platform/computation.h"
 #include "platform/dates.h"
 #include "platform/grid.h"
 #include "platform/shapes.h"
@@ -49,7 +50,12 @@ struct MapPick {
   std::optional<std::pair<int, int>> cell;  ///< Of the first grid.
   std::optional<float> value;               ///< Of that cell; nothing for an empty one.
   std::optional<std::size_t> shape;         ///< Of the first layer of shapes, by its place from 0.
+  std::string shapeValue = {};              ///< The text of that shape's value.
 };
+
+/// What must be computed before a map or chart can show all that it is to show. Whoever shows it has that done, and
+/// then asks for the content anew; until then it lacks what is computed, and holds the rest.
+using Awaited = std::vector<std::shared_ptr<Computation>>;
 
 /// What a map shows, from the bottom up: grids, shapes, points.
 struct MapContent {
@@ -59,6 +65,7 @@ struct MapContent {
   std::optional<Envelope> area;  ///< Shown at first; the envelope of all layers when nothing is said.
   std::string message;           ///< Shown in the place of a map that has nothing to show.
   std::function<void(const MapPick& pick)> picked;  ///< A click of the user; may be empty.
+  Awaited awaited = {};
 
   bool IsEmpty() const { return grids.empty() && shapes.empty() && points.empty(); }
 };
@@ -77,9 +84,31 @@ struct SeriesContent {
   /// Shaded: the time that is simulated.
   std::optional<std::pair<CYbDateTime, CYbDateTime>> period;
   std::string message;  ///< Shown in the place of a chart that has nothing to show.
+  Awaited awaited = {};
 
   bool IsEmpty() const { return series.empty(); }
 };
+
+/// The result if it is there; else null, and it is awaited.
+template <class Data>
+std::shared_ptr<const Data> NowOrAwaited(const std::shared_ptr<Computed<Data>>& computed, Awaited& awaited) {
+  if (computed->IsDone()) return computed->Result();
+  awaited.push_back(computed);
+  return nullptr;
+}
+
+/// The content when all that it awaits is computed, here and now.
+template <class Content>
+Content Finished(const std::function<Content()>& content) {
+  Content shown = content();
+  while (!shown.awaited.empty()) {
+    for (const auto& computation : shown.awaited) computation->Run();
+    // What was computed must be known until it is asked for.
+    Content next = content();
+    shown = std::move(next);
+  }
+  return shown;
+}
 
 /// Whether both look the same on the screen: the same grids and shapes (not merely equal ones), and the same rest. What
 /// a click does is not asked.

@@ -171,9 +171,10 @@ struct DataFile::State {
 
   /// Reads one step (and layer) that stands in the order of the buffer.
   std::string ReadInOrder(const ItemStorage& storage, std::vector<std::size_t> start, std::vector<std::size_t> count,
-                          std::size_t nx, std::span<float> values, const UnitConversion* conversion) const;
+                          std::size_t nx, std::span<float> values, const UnitConversion* conversion,
+                          ProgressPart progress) const;
   std::string ReadByBoxes(const ItemStorage& storage, const DataItem& item, std::size_t step, std::optional<int> layer,
-                          std::span<float> values, const UnitConversion* conversion) const;
+                          std::span<float> values, const UnitConversion* conversion, ProgressPart progress) const;
   /// Reads a band of a raster; the error names the file.
   std::string ReadRaster(const ItemStorage& storage, const DataItem& item, std::span<float> values,
                          const UnitConversion* conversion) const;
@@ -224,17 +225,80 @@ class BoxWalk {
 
 constexpr const char* kTooLarge = "a value is too large for single precision in this unit";
 
+/// Reads a box of values that stand in the file's order piece by piece, so that nobody waits long for the lock, nor for
+/// the end of what was cancelled.
+class PieceReader {
+ public:
+  PieceReader(int file, const ItemStorage& storage, std::size_t size, ProgressPart progress)
+      : file_(file), storage_(storage), size_(static_cast<double>(size)), progress_(progress) {}
+
+  struct Box {
+    std::vector<std::size_t> start, count;
+  };
+  /// Dimensions before `d` have a count of 1 each. Gives the status of the library; throws `Cancelled`.
+  int Read(std::size_t d, Box box, std::span<float> values) {
+    if (values.size() <= kAtOnce || d == box.count.size()) return Get(box, values);
+    const std::size_t all = box.count[d], inner = values.size() / all;
+    std::size_t atOnce = std::max<std::size_t>(kAtOnce / inner, 1);
+    // A stored piece is unpacked as a whole, so that it should be asked for once.
+    if (!storage_.chunk.empty() && inner <= kAtOnce) atOnce = std::max(atOnce / Chunk(d) * Chunk(d), Chunk(d));
+    if (!storage_.chunk.empty() && inner > kAtOnce) atOnce = d + 2 == box.count.size() ? Chunk(d) : 1;
+    for (std::size_t done = 0; done < all; done += atOnce) {
+      box.count[d] = std::min(atOnce, all - done);
+      const std::span<float> piece = values.subspan(done * inner, box.count[d] * inner);
+      const int status = box.count[d] == 1 ? Read(d + 1, box, piece) : Get(box, piece);
+      if (status != NC_NOERR) return status;
+      box.start[d] += atOnce;
+    }
+    return NC_NOERR;
+  }
+
+ private:
+  static constexpr std::size_t kAtOnce = std::size_t{1} << 19;  ///< A millisecond, if the file is at hand.
+
+  std::size_t Chunk(std::size_t d) const { return std::max<std::size_t>(storage_.chunk[d], 1); }
+
+  int Get(const Box& box, std::span<float> values) {
+    const std::size_t columns = box.count.empty() ? 1 : box.count.back();
+    const std::size_t width = storage_.chunk.empty() ? columns : Chunk(box.count.size() - 1);
+    if (values.size() <= kAtOnce || width >= columns) return GetAtOnce(box, values);
+    // Wide rows of packed pieces, one piece after the other.
+    Box part = box;
+    std::vector<float> read;
+    for (std::size_t first = 0; first < columns; first += width) {
+      const std::size_t count = part.count.back() = std::min(width, columns - first);
+      read.resize(values.size() / columns * count);
+      if (const int status = GetAtOnce(part, read); status != NC_NOERR) return status;
+      for (std::size_t from = 0, to = first; from < read.size(); from += count, to += columns)
+        std::copy_n(read.begin() + static_cast<std::ptrdiff_t>(from), count,
+                    values.begin() + static_cast<std::ptrdiff_t>(to));
+      part.start.back() += width;
+    }
+    return NC_NOERR;
+  }
+
+  int GetAtOnce(const Box& box, std::span<float> values) {
+    progress_.ThrowIfCancelled();
+    const netcdf::Lock lock;
+    const int status = nc_get_vara_float(file_, storage_.variable, box.start.data(), box.count.data(), values.data());
+    progress_.Tell(static_cast<double>(done_ += values.size()) / size_);
+    return status;
+  }
+
+  int file_;
+  const ItemStorage& storage_;
+  double size_;
+  std::size_t done_ = 0;
+  ProgressPart progress_;
+};
+
 }  // namespace
 
 std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector<std::size_t> start,
                                          std::vector<std::size_t> count, std::size_t nx, std::span<float> values,
-                                         const UnitConversion* conversion) const {
-  {
-    const netcdf::Lock lock;
-    if (const int status = nc_get_vara_float(file.Id(), storage.variable, start.data(), count.data(), values.data())) {
-      return netcdf::InWords(status);
-    }
-  }
+                                         const UnitConversion* conversion, ProgressPart progress) const {
+  PieceReader reader(file.Id(), storage, values.size(), progress);
+  if (const int status = reader.Read(0, {std::move(start), std::move(count)}, values)) return netcdf::InWords(status);
   bool fits = true;
   for (std::size_t begin = 0; begin < values.size(); begin += kPiece) {
     const std::span<float> piece = values.subspan(begin, std::min(kPiece, values.size() - begin));
@@ -255,7 +319,7 @@ std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector
 
 std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataItem& item, std::size_t step,
                                          std::optional<int> layer, std::span<float> values,
-                                         const UnitConversion* conversion) const {
+                                         const UnitConversion* conversion, ProgressPart progress) const {
   const std::size_t rank = storage.lengths.size();
   std::vector<std::size_t> start(rank, 0), count(rank, 1);
   // How far apart neighbours along each dimension of the file stand in the buffer, and where the file's first goes.
@@ -297,6 +361,8 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
   std::vector<double> box(values.size() / slices);
   bool fits = true;
   for (std::size_t slice = 0; slice < slices; ++slice) {
+    progress.ThrowIfCancelled();
+    progress.Tell(static_cast<double>(slice) / static_cast<double>(slices));
     std::ptrdiff_t target = origin;
     if (isSliced) {
       start[outermost] = slice;
@@ -372,8 +438,8 @@ std::size_t DataFile::SizeOf(const ValueSelection& selection) const {
   return selection.steps * (selection.layer ? item.CellsOfLayer() : item.Cells());
 }
 
-std::string DataFile::Read(const ValueSelection& selection, std::span<float> values,
-                           std::optional<int> inBaseUnitOf) const {
+std::string DataFile::Read(const ValueSelection& selection, std::span<float> values, std::optional<int> inBaseUnitOf,
+                           ProgressPart progress) const {
   const auto refused = [&](const std::string& reason) { return fmt::format("cannot read {}: {}", Path(), reason); };
   if (selection.item < 1 || static_cast<std::size_t>(selection.item) > Items().size()) {
     return refused(fmt::format("there is no item {}: the file has {}", selection.item, Items().size()));
@@ -416,6 +482,8 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
   try {
     for (std::size_t i = 0; i < calls; ++i) {
       const std::span<float> part = values.subspan(i * size, size);
+      const auto all = static_cast<double>(calls);
+      const ProgressPart told = progress.Part(static_cast<double>(i) / all, static_cast<double>(i + 1) / all);
       std::string reason;
       if (isInOrder) {
         std::vector<std::size_t> start(storage.lengths.size(), 0), count = storage.lengths;
@@ -427,10 +495,10 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
           start[static_cast<std::size_t>(storage.z)] = static_cast<std::size_t>(*selection.layer);
           count[static_cast<std::size_t>(storage.z)] = 1;
         }
-        reason =
-            state_->ReadInOrder(storage, start, count, static_cast<std::size_t>(item.geometry.nx), part, converter);
+        reason = state_->ReadInOrder(storage, std::move(start), std::move(count),
+                                     static_cast<std::size_t>(item.geometry.nx), part, converter, told);
       } else {
-        reason = state_->ReadByBoxes(storage, item, selection.step + i, selection.layer, part, converter);
+        reason = state_->ReadByBoxes(storage, item, selection.step + i, selection.layer, part, converter, told);
       }
       if (!reason.empty()) {
         return refused(fmt::format("item {}, step {}: {}", selection.item, selection.step + i + 1, reason));
@@ -438,6 +506,8 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
     }
   } catch (const std::bad_alloc&) {
     return refused("it needs more than the free memory");
+  } catch (const Cancelled&) {
+    return refused(kCancelled);
   }
   return {};
 }

@@ -23,6 +23,7 @@
 #include "platform/dates.h"
 #include "platform/grid.h"
 #include "platform/grid_geometry.h"
+#include "platform/progress.h"
 #include "platform/units.h"
 
 namespace tervane {
@@ -125,9 +126,10 @@ class DataFile {
   /// Reads values in the order step, layer, row from the south, column from the west; the buffer must be as large as
   /// the selection. What the file marks as missing, what is not finite and what lies outside the file's own valid range
   /// is kDeleteValue. Values are in the file's unit, or, when an item type is given, in that item type's base unit;
-  /// kUndefinedItemType, which has none, leaves the file's unit.
-  std::string Read(const ValueSelection& selection, std::span<float> values,
-                   std::optional<int> inBaseUnitOf = {}) const;
+  /// kUndefinedItemType, which has none, leaves the file's unit. After an error, also "cancelled", the buffer holds
+  /// nothing of use.
+  std::string Read(const ValueSelection& selection, std::span<float> values, std::optional<int> inBaseUnitOf = {},
+                   ProgressPart progress = {}) const;
   /// The number of values that a selection has.
   std::size_t SizeOf(const ValueSelection& selection) const;
 

@@ -209,6 +209,10 @@ class HeaderReader {
     ItemStorage storage;
     storage.variable = variable.id;
     storage.type = variable.type;
+    int layout = NC_CONTIGUOUS;
+    storage.chunk.resize(variable.dimensions.size());
+    if (nc_inq_var_chunking(file_, variable.id, &layout, storage.chunk.data()) != NC_NOERR || layout != NC_CHUNKED)
+      storage.chunk.clear();
     if (const std::string reason = FindDimensions(variable, storage); !reason.empty()) {
       notes_.push_back(fmt::format("the variable {} is left out: {}", variable.name, reason));
       return {};

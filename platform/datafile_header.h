@@ -22,6 +22,8 @@ struct ItemStorage {
   int variable = 0;
   nc_type type = NC_FLOAT;
   std::vector<std::size_t> lengths;  ///< In the order of the file.
+  /// Of the pieces in which a netCDF-4 file stores, and perhaps packs, the values; empty when they stand in one.
+  std::vector<std::size_t> chunk;
   /// Places of the dimensions in that order; -1 where there is none.
   int time = -1, x = -1, y = -1, z = -1;
   bool isXTurned = false, isYTurned = false, isZTurned = false;  ///< Stored from the east, the north, the top.

@@ -160,7 +160,9 @@ struct DataFileWriter::State {
   }
   int Define();
   std::string WhyStepIsIncomplete() const;
-  std::string PutPart(int item, std::optional<int> layer, std::span<const float> values);
+  std::string PutPart(int item, std::optional<int> layer, std::span<const float> values, ProgressPart progress = {});
+  /// Puts rows of a layer piece by piece, so that nobody waits long for the lock. "" or why not.
+  std::string PutRows(int variable, std::size_t layer, std::span<const float> values, ProgressPart progress);
 };
 
 /// Makes all dimensions, variables and attributes, and writes the coordinates. The lock must be held.
@@ -285,7 +287,39 @@ std::string DataFileWriter::State::WhyStepIsIncomplete() const {
   return {};
 }
 
-std::string DataFileWriter::State::PutPart(int item, std::optional<int> layer, std::span<const float> values) {
+std::string DataFileWriter::State::PutRows(int variable, std::size_t layer, std::span<const float> values,
+                                           ProgressPart progress) {
+  constexpr std::size_t kPiece = std::size_t{1} << 16, kTileRows = 1024;
+  std::vector<std::size_t> start, count;
+  if (content.hasTime) {
+    start.push_back(*step);
+    count.push_back(1);
+  }
+  if (content.dimensions > 2) {
+    start.push_back(layer);
+    count.push_back(1);
+  }
+  const auto nx = static_cast<std::size_t>(content.geometry.nx), ny = static_cast<std::size_t>(content.geometry.ny);
+  const std::size_t y = start.size();
+  if (content.dimensions > 1) start.push_back(0), count.push_back(0);
+  if (content.dimensions > 0) start.push_back(0), count.push_back(nx);
+  const std::size_t atOnce = content.isCompressed ? kTileRows : std::max<std::size_t>(kPiece / nx, 1);
+  for (std::size_t row = 0; row < ny; row += atOnce) {
+    if (progress.IsCancelled()) return kCancelled;
+    progress.Tell(static_cast<double>(row) / static_cast<double>(ny));
+    if (content.dimensions > 1) {
+      start[y] = row;
+      count[y] = std::min(atOnce, ny - row);
+    }
+    const netcdf::Lock lock;
+    const int status = nc_put_vara_float(file.Id(), variable, start.data(), count.data(), values.data() + row * nx);
+    if (status != NC_NOERR) return netcdf::InWords(status);
+  }
+  return {};
+}
+
+std::string DataFileWriter::State::PutPart(int item, std::optional<int> layer, std::span<const float> values,
+                                           ProgressPart progress) {
   if (!failure.empty()) return failure;
   const auto refused = [&](const std::string& reason) { return Fail(reason); };
   if (item < 1 || static_cast<std::size_t>(item) > content.items.size()) {
@@ -314,27 +348,13 @@ std::string DataFileWriter::State::PutPart(int item, std::optional<int> layer, s
   }
   summaries[index].AddRange(values);
 
-  std::vector<std::size_t> start, count;
-  if (content.hasTime) {
-    start.push_back(*step);
-    count.push_back(1);
-  }
-  if (content.dimensions > 2) {
-    start.push_back(layer ? static_cast<std::size_t>(*layer) : 0);
-    count.push_back(layer ? 1 : done.size());
-  }
-  if (content.dimensions > 1) {
-    start.push_back(0);
-    count.push_back(static_cast<std::size_t>(geometry.ny));
-  }
-  if (content.dimensions > 0) {
-    start.push_back(0);
-    count.push_back(static_cast<std::size_t>(geometry.nx));
-  }
-  {
-    const netcdf::Lock lock;
-    const int status = nc_put_vara_float(file.Id(), variables[index], start.data(), count.data(), values.data());
-    if (status != NC_NOERR) return refused(netcdf::InWords(status));
+  const std::size_t first = layer ? static_cast<std::size_t>(*layer) : 0;
+  const std::size_t layers = values.size() / layerSize;
+  for (std::size_t i = 0; i < layers; ++i) {
+    const auto all = static_cast<double>(layers);
+    const std::string reason = PutRows(variables[index], first + i, values.subspan(i * layerSize, layerSize),
+                                       progress.Part(static_cast<double>(i) / all, static_cast<double>(i + 1) / all));
+    if (!reason.empty()) return refused(reason);
   }
   if (layer) {
     done[static_cast<std::size_t>(*layer)] = true;
@@ -424,15 +444,15 @@ std::string DataFileWriter::AddStep(const CYbDateTime& stamp) {
   return {};
 }
 
-std::string DataFileWriter::Put(int item, std::span<const float> values) {
-  return state_->file.IsOpen() ? state_->PutPart(item, std::nullopt, values) : "no file is being written";
+std::string DataFileWriter::Put(int item, std::span<const float> values, ProgressPart progress) {
+  return state_->file.IsOpen() ? state_->PutPart(item, std::nullopt, values, progress) : "no file is being written";
 }
 
 std::string DataFileWriter::PutLayer(int item, int layer, std::span<const float> values) {
   return state_->file.IsOpen() ? state_->PutPart(item, layer, values) : "no file is being written";
 }
 
-FileResult DataFileWriter::Finish() {
+FileResult DataFileWriter::Finish(ProgressPart progress) {
   // What was written goes with the state, whatever happens.
   const std::unique_ptr<State> state = std::exchange(state_, std::make_unique<State>());
   FileResult result;
@@ -463,6 +483,7 @@ FileResult DataFileWriter::Finish() {
       !reason.empty()) {
     return {state->Fail(reason), {}};
   }
+  if (progress.IsCancelled()) return {state->Fail(kCancelled), {}};
   return state->replacement.Commit();
 }
 

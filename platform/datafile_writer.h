@@ -51,12 +51,13 @@ class DataFileWriter {
   std::string AddStep(const CYbDateTime& stamp);
   /// Puts the values of an item (from 1) for the present step, in the order layer, row from the south, column from the
   /// west. What is not finite is stored as kDeleteValue.
-  std::string Put(int item, std::span<const float> values);
+  std::string Put(int item, std::span<const float> values, ProgressPart progress = {});
   /// Puts one layer, counted from 0 at the bottom.
   std::string PutLayer(int item, int layer, std::span<const float> values);
 
-  /// Stores the statistics and puts the file in its place. Nothing can be written behind it.
-  FileResult Finish();
+  /// Stores the statistics and puts the file in its place. Nothing can be written behind it. What was to stop before
+  /// leaves no file.
+  FileResult Finish(ProgressPart progress = {});
 
  private:
   struct State;

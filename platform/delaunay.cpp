@@ -98,12 +98,10 @@ class EdgeStore {
   Edge free_ = kNone;
 };
 
-struct Cancelled {};
-
 class Triangulation {
  public:
-  Triangulation(const std::vector<LatticePoint>& points, const std::atomic<bool>* cancel)
-      : points_(points), edges_(points.size()), cancel_(cancel) {}
+  Triangulation(const std::vector<LatticePoint>& points, ProgressPart progress)
+      : points_(points), edges_(points.size()), progress_(progress) {}
 
   std::vector<Triangle> Run() {
     if (points_.size() < 3) return {};
@@ -111,6 +109,7 @@ class Triangulation {
     std::vector<Triangle> triangles;
     triangles.reserve(2 * points_.size());
     for (Edge e = 0; e < edges_.Count(); ++e) {
+      if ((e & 0xFFFFu) == 0) progress_.ThrowIfCancelled();
       if (edges_.IsRemoved(e)) continue;
       const Edge second = edges_.LeftNext(e), third = edges_.LeftNext(second);
       // Each face once, and not the outer one, which lies on the right of its edges' turn.
@@ -137,7 +136,10 @@ class Triangulation {
 
   Hull Divide(std::uint32_t begin, std::uint32_t end) {
     constexpr std::uint32_t kAskEvery = 1024;
-    if (end - begin > kAskEvery && cancel_ && cancel_->load(std::memory_order_relaxed)) throw Cancelled();
+    if (end - begin > kAskEvery) {
+      progress_.ThrowIfCancelled();
+      progress_.Tell(static_cast<double>(begin) / static_cast<double>(points_.size()));
+    }
     if (end - begin == 2) {
       const Edge e = edges_.Make(begin, begin + 1);
       return {e, EdgeStore::Sym(e)};
@@ -203,17 +205,13 @@ class Triangulation {
 
   const std::vector<LatticePoint>& points_;
   EdgeStore edges_;
-  const std::atomic<bool>* cancel_;
+  ProgressPart progress_;
 };
 
 }  // namespace
 
-std::vector<Triangle> Triangulate(const std::vector<LatticePoint>& points, const std::atomic<bool>* cancel) {
-  try {
-    return Triangulation(points, cancel).Run();
-  } catch (const Cancelled&) {
-    return {};
-  }
+std::vector<Triangle> Triangulate(const std::vector<LatticePoint>& points, ProgressPart progress) {
+  return Triangulation(points, progress).Run();
 }
 
 }  // namespace tervane

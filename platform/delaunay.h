@@ -5,9 +5,10 @@
 #pragma once
 
 #include <array>
-#include <atomic>
 #include <cstdint>
 #include <vector>
+
+#include "platform/progress.h"
 
 namespace tervane {
 
@@ -26,7 +27,7 @@ using Triangle = std::array<std::uint32_t, 3>;
 
 /// The Delaunay triangulation of distinct points sorted by x, then y; no triangles when all lie on one line. Divide and
 /// conquer (Guibas and Stolfi 1985), in time n log n whatever the points. Where more than three points lie on a circle,
-/// one of the possible triangulations. Empty, too, when `cancel` is set meanwhile.
-std::vector<Triangle> Triangulate(const std::vector<LatticePoint>& points, const std::atomic<bool>* cancel = nullptr);
+/// one of the possible triangulations. Throws `Cancelled`.
+std::vector<Triangle> Triangulate(const std::vector<LatticePoint>& points, ProgressPart progress = {});
 
 }  // namespace tervane

@@ -251,7 +251,9 @@ Reason OpenRegular(const std::string& path, os::File& file, os::File::Status& st
 
 enum class ReadOutcome { Done, Failed, Shrunk, Grown };
 
-ReadOutcome ReadOnce(const std::string& path, FileContent& content, Reason& reason) {
+ReadOutcome ReadOnce(const std::string& path, FileContent& content, ProgressPart progress, Reason& reason) {
+  // A few milliseconds, if the file is at hand.
+  constexpr std::size_t kPiece = std::size_t{1} << 24;
   os::File file;
   os::File::Status status;
   reason = OpenRegular(path, file, status);
@@ -261,20 +263,21 @@ ReadOutcome ReadOnce(const std::string& path, FileContent& content, Reason& reas
   content.data = std::make_unique_for_overwrite<char[]>(size + 1);
   std::error_code error;
   while (content.size < size) {
-    const std::size_t done = file.Read(content.data.get() + content.size, size - content.size, error);
-    if (error) {
-      reason = InWords(error);
+    const std::size_t done = file.Read(content.data.get() + content.size, std::min(size - content.size, kPiece), error);
+    if (error || progress.IsCancelled()) {
+      reason = error ? InWords(error) : kCancelled;
       return ReadOutcome::Failed;
     }
     if (done == 0) return ReadOutcome::Shrunk;
     content.size += done;
+    progress.Tell(static_cast<double>(content.size) / static_cast<double>(size));
   }
   content.data[size] = '\0';
   char more;
   return file.Read(&more, 1, error) == 0 ? ReadOutcome::Done : ReadOutcome::Grown;
 }
 
-Reason ReadRegular(const std::string& path, FileContent& content) {
+Reason ReadRegular(const std::string& path, FileContent& content, ProgressPart progress) {
   if (Reason reason = WhyNoPath(path); !reason.empty()) return reason;
   constexpr int kAttempts = 3;
   Reason reason;
@@ -282,7 +285,7 @@ Reason ReadRegular(const std::string& path, FileContent& content) {
   // Another program may be writing: begin again with the new size. A log that grows all the time is taken as it stood
   // when it was opened.
   for (int i = 0; i < kAttempts; ++i) {
-    outcome = ReadOnce(path, content, reason);
+    outcome = ReadOnce(path, content, progress, reason);
     if (outcome == ReadOutcome::Done || outcome == ReadOutcome::Failed) return reason;
   }
   return outcome == ReadOutcome::Grown ? Reason() : "another program is changing it; try again";
@@ -314,10 +317,10 @@ FileContent FileContent::Of(std::string_view text) {
   return content;
 }
 
-FileResult ReadWholeFile(const std::string& path, FileContent& content) {
+FileResult ReadWholeFile(const std::string& path, FileContent& content, ProgressPart progress) {
   FileResult result;
   try {
-    const Reason reason = ReadRegular(path, content);
+    const Reason reason = ReadRegular(path, content, progress);
     if (!reason.empty()) result.error = fmt::format("cannot read {}: {}", path, reason);
   } catch (const std::bad_alloc&) {
     result.error = fmt::format("cannot read {}: it is larger than the free memory", path);

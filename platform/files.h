@@ -12,6 +12,8 @@
 #include <string>
 #include <string_view>
 
+#include "platform/progress.h"
+
 namespace tervane {
 
 /// The outcome of a file operation: empty `error` means done. The error names the path, says why in words and what to
@@ -33,7 +35,7 @@ struct FileContent {
 };
 
 /// Reads a regular file whole. A folder, a FIFO or a device is refused at once, never waited for.
-FileResult ReadWholeFile(const std::string& path, FileContent& content);
+FileResult ReadWholeFile(const std::string& path, FileContent& content, ProgressPart progress = {});
 
 /// Replaces the file's content in one step: afterwards the old or the new file stands whole, also after a crash or a
 /// power cut. A new file is written beside it, compared in size, flushed, renamed over the target, and the folder is

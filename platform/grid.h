@@ -94,7 +94,7 @@ class CTvn2DOrthoRotatedGridData {
   /// of cell size and corner counts before `place`, whose nx and ny are not asked; a note tells where they differ.
   /// Values stay in the unit of the file, which is `itemUnit`. Errors name file and line; then the grid is as it was.
   FileResult ReadTextFile(const std::string& path, const GridGeometry& place, float deleteValue, int itemUnit,
-                          int itemType);
+                          int itemType, ProgressPart progress = {});
 
   /// Interpolates the points of a shape or XYZ file; cells without a value are empty. The grid gets the base unit of
   /// the item type. See platform/grid_interpolation.h.
@@ -102,10 +102,11 @@ class CTvn2DOrthoRotatedGridData {
                                 const InterpolationOptions& options);
   /// Gives each cell the code of the polygon in which its centre lies. See platform/grid_polygons.h.
   FileResult CreateGridData_GIS_Polygon(GridGeometry geometry, float deleteValue, const PolygonFile& file,
-                                        ZoneTable& zones);
+                                        ZoneTable& zones, ProgressPart progress = {});
   /// Makes a model domain of the polygons of a file: 1 inside, 2 at the outer boundary, empty outside. See
   /// platform/grid_polygons.h.
-  FileResult MakeCatchmentGriddataFromShapefile(const std::string& path, int axisUnit, GridGeometry geometry);
+  FileResult MakeCatchmentGriddataFromShapefile(const std::string& path, int axisUnit, GridGeometry geometry,
+                                                ProgressPart progress = {});
 
   const GridGeometry& Geometry() const { return geometry_; }
   float DeleteValue() const { return deleteValue_; }

@@ -32,15 +32,18 @@ GridGeometry GeometryOf(const DataItem& item) {
 
 }  // namespace
 
-FileResult ReadGridData(const std::string& path, int number, CTvn2DOrthoRotatedGridData& grid) {
+FileResult ReadGridData(const std::string& path, int number, CTvn2DOrthoRotatedGridData& grid, ProgressPart progress,
+                        const GridSlice& slice) {
   DataFile file;
   const DataItem* item = nullptr;
   if (FileResult result = OpenGrid(path, number, file, item); !result.Ok()) return result;
   GridGeometry geometry = GeometryOf(*item);
   if (std::string problem = geometry.Problem(); !problem.empty()) return Failed(fmt::format("{}: {}", path, problem));
   std::vector<float> values(item->CellsOfLayer());
-  const ValueSelection selection{number, 0, 1, item->dimensions == 3 ? std::optional(0) : std::nullopt};
-  if (std::string error = file.Read(selection, values, item->itemType); !error.empty()) return Failed(std::move(error));
+  const ValueSelection selection{number, slice.step, 1,
+                                 item->dimensions == 3 ? std::optional(slice.layer) : std::nullopt};
+  if (std::string error = file.Read(selection, values, item->itemType, progress); !error.empty())
+    return Failed(std::move(error));
   for (float& value : values)
     if (value == kDeleteValue) value = kUsualDeleteValue;
   const ItemType* type = FindItemType(item->itemType);
@@ -65,7 +68,7 @@ FileGeometry FileGeometryOf(const GridGeometry& geometry) {
   return place;
 }
 
-FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridData& grid) {
+FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
   NewDataFile content;
   content.geometry = FileGeometryOf(grid.Geometry());
   const ItemType* type = FindItemType(grid.ItemType());
@@ -78,8 +81,8 @@ FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridDa
   std::vector<float> values = grid.Values();
   for (float& value : values)
     if (grid.IsEmptyValue(value)) value = kDeleteValue;
-  if (std::string error = writer.Put(1, values); !error.empty()) return Failed(std::move(error));
-  return writer.Finish();
+  if (std::string error = writer.Put(1, values, progress); !error.empty()) return Failed(std::move(error));
+  return writer.Finish(progress);
 }
 
 FileResult ReadGeoInfoFromNdsFile(const std::string& path, int number, GridGeometry& geometry) {
@@ -107,13 +110,13 @@ DomainFileState ReadDomainFacts(const std::string& path, DomainFileFacts& facts)
   return DomainFileState::Read;
 }
 
-FileResult ReadXyzShapes(const std::string& path, int axisUnit, CTvnShapeData& shapes) {
+FileResult ReadXyzShapes(const std::string& path, int axisUnit, CTvnShapeData& shapes, ProgressPart progress) {
   ScatteredFile file;
   file.path = path;
   file.isXyz = true;
   file.axisUnit = axisUnit;
   std::vector<ScatteredPoint> points;
-  FileResult result = ReadScatteredFile(file, points);
+  FileResult result = ReadScatteredFile(file, points, progress);
   if (!result.Ok()) return result;
   shapes.Create(ShapeKind::Point, {{"Z", AttributeKind::Real}}, {});
   for (const ScatteredPoint& point : points) {

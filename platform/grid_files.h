@@ -6,16 +6,30 @@
 
 #include <string>
 
+#include "platform/computation.h"
 #include "platform/grid.h"
 #include "platform/grid_geometry.h"
+#include "platform/progress.h"
 #include "platform/shapes.h"
 
 namespace tervane {
 
-/// Reads the first time step of an item of a grid file, in the base unit of its item type.
-FileResult ReadGridData(const std::string& path, int item, CTvn2DOrthoRotatedGridData& grid);
+/// A grid that is read, interpolated or made of polygons.
+using ComputedGrid = Computed<CTvn2DOrthoRotatedGridData>;
+
+/// One grid of an item; steps and layers are counted from 0, layers from the bottom.
+struct GridSlice {
+  std::size_t step = 0;
+  int layer = 0;
+
+  bool operator==(const GridSlice&) const = default;
+};
+/// Reads a grid of an item, the first of its steps and layers unless told, in the base unit of its item type. `grid`
+/// stays as it was on failure.
+FileResult ReadGridData(const std::string& path, int item, CTvn2DOrthoRotatedGridData& grid, ProgressPart progress = {},
+                        const GridSlice& slice = {});
 /// Writes a grid as a data file with one item and no time axis, in place of a file of that name.
-FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridData& grid);
+FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridData& grid, ProgressPart progress = {});
 /// The same place in the words of data files.
 FileGeometry FileGeometryOf(const GridGeometry& geometry);
 /// Where the grid of an item stands, without its values.
@@ -31,6 +45,6 @@ struct DomainFileFacts {
 DomainFileState ReadDomainFacts(const std::string& path, DomainFileFacts& facts);
 
 /// The points of a text file as shapes whose value is their z.
-FileResult ReadXyzShapes(const std::string& path, int axisUnit, CTvnShapeData& shapes);
+FileResult ReadXyzShapes(const std::string& path, int axisUnit, CTvnShapeData& shapes, ProgressPart progress = {});
 
 }  // namespace tervane

@@ -31,6 +31,7 @@ struct Target {
   int nx, ny;
   float deleteValue;
   float* values;
+  ProgressPart progress;
 
   float* Row(int j) const { return values + static_cast<std::ptrdiff_t>(j) * nx; }
 };
@@ -42,10 +43,19 @@ std::pair<int, int> CentresIn(double low, double high, int count) {
           static_cast<int>(std::clamp(last, -1.0, static_cast<double>(count - 1)))};
 }
 
+/// Sorts many points and yet stops soon where that is asked for.
+template <class Items, class Before>
+void Sort(Items& items, ProgressPart progress, const Before& before) {
+  std::sort(items.begin(), items.end(), [&](const auto& a, const auto& b) {
+    progress.ThrowIfCancelled();
+    return before(a, b);
+  });
+}
+
 /// The mean of points at the same place; afterwards they are sorted by x, then y.
-void MergeCoincident(std::vector<ScatteredPoint>& points) {
+void MergeCoincident(std::vector<ScatteredPoint>& points, ProgressPart progress) {
   // By z last: the mean of a place then does not depend on the order of the file.
-  std::sort(points.begin(), points.end(), [](const ScatteredPoint& a, const ScatteredPoint& b) {
+  Sort(points, progress, [](const ScatteredPoint& a, const ScatteredPoint& b) {
     return a.x != b.x ? a.x < b.x : a.y != b.y ? a.y < b.y : a.z < b.z;
   });
   auto out = points.begin();
@@ -65,10 +75,10 @@ void MergeCoincident(std::vector<ScatteredPoint>& points) {
 /// Each point adds to the cells of a row within its reach: nothing is searched, and the sums stay in the fastest cache.
 class InverseDistance {
  public:
-  InverseDistance(std::vector<ScatteredPoint> points, double radius, bool isSquared)
+  InverseDistance(std::vector<ScatteredPoint> points, double radius, bool isSquared, ProgressPart progress)
       : points_(std::move(points)), radius_(radius), isSquared_(isSquared) {
-    std::sort(points_.begin(), points_.end(),
-              [](const ScatteredPoint& a, const ScatteredPoint& b) { return a.y != b.y ? a.y < b.y : a.x < b.x; });
+    Sort(points_, progress,
+         [](const ScatteredPoint& a, const ScatteredPoint& b) { return a.y != b.y ? a.y < b.y : a.x < b.x; });
   }
 
   void Rows(int begin, int end, const Target& target) const {
@@ -84,6 +94,8 @@ class InverseDistance {
       const auto isBelow = [](const ScatteredPoint& point, double limit) { return point.y < limit; };
       for (auto point = std::lower_bound(points_.begin(), points_.end(), y - radius_, isBelow);
            point != points_.end() && point->y <= y + radius_; ++point) {
+        // Many points within a large radius make a single row take seconds.
+        if (target.progress.IsCancelled()) return;
         AddPoint(*point, y, centres, weights, sums, hits);
       }
       float* const row = target.Row(j);
@@ -138,9 +150,12 @@ class InverseDistance {
 
 struct PointCloud {
   const std::vector<ScatteredPoint>& points;
+  ProgressPart progress;
 
   std::size_t kdtree_get_point_count() const { return points.size(); }
   double kdtree_get_pt(std::size_t index, std::size_t dimension) const {
+    // The only place at which the making of a tree can be left.
+    progress.ThrowIfCancelled();
     return dimension == 0 ? points[index].x : points[index].y;
   }
   template <class Box>
@@ -228,8 +243,8 @@ std::optional<std::array<double, 4>> BilinearWeights(const std::array<QuadrantNe
 
 class Bilinear {
  public:
-  Bilinear(std::vector<ScatteredPoint> points, double radius)
-      : points_(std::move(points)), cloud_{points_}, tree_(2, cloud_), radius2_(radius * radius) {}
+  Bilinear(std::vector<ScatteredPoint> points, double radius, ProgressPart progress)
+      : points_(std::move(points)), cloud_{points_, progress}, tree_(2, cloud_), radius2_(radius * radius) {}
 
   void Rows(int begin, int end, const Target& target) const {
     for (int j = begin; j < end; ++j) {
@@ -274,9 +289,9 @@ class Bilinear {
 class Triangular {
  public:
   /// The points stand in world coordinates.
-  Triangular(const std::vector<ScatteredPoint>& points, const GridGeometry& geometry, const std::atomic<bool>* cancel) {
-    PutOnLattice(points, geometry);
-    triangles_ = Triangulate(lattice_, cancel);
+  Triangular(const std::vector<ScatteredPoint>& points, const GridGeometry& geometry, ProgressPart progress) {
+    PutOnLattice(points, geometry, progress);
+    triangles_ = Triangulate(lattice_, progress);
     rows_.reserve(triangles_.size());
     for (const Triangle& triangle : triangles_) {
       const auto [low, high] = std::minmax({points_[triangle[0]].y, points_[triangle[1]].y, points_[triangle[2]].y});
@@ -299,7 +314,7 @@ class Triangular {
   /// Whole coordinates make the triangulation exact. They are taken on the map, so that points on a line or a regular
   /// grid of the map stay on one, for which the step is a power of two; the longer side of the points has a billion
   /// steps.
-  void PutOnLattice(const std::vector<ScatteredPoint>& points, const GridGeometry& geometry) {
+  void PutOnLattice(const std::vector<ScatteredPoint>& points, const GridGeometry& geometry, ProgressPart progress) {
     const GridTransform transform(geometry);
     double xMin = points[0].x, yMin = points[0].y, xMax = xMin, yMax = yMin;
     for (const ScatteredPoint& point : points) {
@@ -320,7 +335,7 @@ class Triangular {
     for (const ScatteredPoint& point : points) {
       placed.push_back({{onLattice(point.x - xMin), onLattice(point.y - yMin)}, point});
     }
-    std::sort(placed.begin(), placed.end(), [](const Placed& a, const Placed& b) {
+    Sort(placed, progress, [](const Placed& a, const Placed& b) {
       return a.place.x != b.place.x   ? a.place.x < b.place.x
              : a.place.y != b.place.y ? a.place.y < b.place.y
                                       : a.point.z < b.point.z;
@@ -422,7 +437,10 @@ std::string WhyNot(const std::vector<ScatteredPoint>& points, const GridGeometry
 
 FileResult InterpolateChecked(std::vector<ScatteredPoint> points, const GridGeometry& geometry, float deleteValue,
                               const InterpolationOptions& options, std::vector<float>& values) {
-  MergeCoincident(points);
+  // A triangulation takes as long as filling the rows; all else is quick beside them.
+  const ProgressPart making = options.progress.Part(0, options.method == InterpolationMethod::Triangular ? 0.5 : 0.05);
+  const ProgressPart filling = options.progress.Part(options.method == InterpolationMethod::Triangular ? 0.5 : 0.05, 1);
+  MergeCoincident(points, making);
   const bool isOnMap = options.method == InterpolationMethod::Triangular;
   const GridTransform transform(geometry);
   for (ScatteredPoint& point : points) {
@@ -433,22 +451,21 @@ FileResult InterpolateChecked(std::vector<ScatteredPoint> points, const GridGeom
   }
   const double radius = options.searchRadius / geometry.cellSize;
   values.resize(geometry.CellCount());
-  const Target target{geometry.nx, geometry.ny, deleteValue, values.data()};
+  const Target target{geometry.nx, geometry.ny, deleteValue, values.data(), filling};
   const auto run = [&](int rowsAtOnce, const auto& method) {
-    return ForRows(geometry.ny, rowsAtOnce, options.threads, options.progress, options.cancel,
-                   [&](int begin, int end) { method.Rows(begin, end, target); });
+    ForRows(geometry.ny, rowsAtOnce, options.threads, filling,
+            [&](int begin, int end) { method.Rows(begin, end, target); });
   };
   // Many points within reach make a row slow, and a user who cancels should not wait for several.
   constexpr int kFewRows = 8;
   constexpr std::size_t kManyPoints = 100'000;
   FileResult result;
-  bool isDone = false;
   switch (options.method) {
     case InterpolationMethod::Bilinear:
-      isDone = run(kFewRows, Bilinear(std::move(points), radius));
+      run(kFewRows, Bilinear(std::move(points), radius, making));
       break;
     case InterpolationMethod::Triangular: {
-      const Triangular triangular(points, geometry, options.cancel);
+      const Triangular triangular(points, geometry, making);
       if (!triangular.HasTriangles())
         result.note = "all points lie on one line and span no triangle: all cells are empty";
       if (triangular.MergedPoints() > 0) {
@@ -457,15 +474,14 @@ FileResult InterpolateChecked(std::vector<ScatteredPoint> points, const GridGeom
       }
       // Each block of rows goes through all triangles, so that there should not be many.
       constexpr int kBlocks = 16;
-      isDone = run(std::max(1, geometry.ny / (kBlocks * std::max(1, options.threads)) + 1), triangular);
+      run(std::max(1, geometry.ny / (kBlocks * std::max(1, options.threads)) + 1), triangular);
       break;
     }
     default:
-      isDone = run(
-          points.size() > kManyPoints ? 1 : kFewRows,
-          InverseDistance(std::move(points), radius, options.method == InterpolationMethod::InverseDistanceSquared));
+      run(points.size() > kManyPoints ? 1 : kFewRows,
+          InverseDistance(std::move(points), radius, options.method == InterpolationMethod::InverseDistanceSquared,
+                          making));
   }
-  if (!isDone) return {"the interpolation was cancelled", {}};
   return result;
 }
 
@@ -478,6 +494,8 @@ FileResult Interpolate(std::vector<ScatteredPoint> points, const GridGeometry& g
     if (result.Ok()) result = InterpolateChecked(std::move(points), geometry, deleteValue, options, values);
   } catch (const std::bad_alloc&) {
     result.error = "there is no memory for the interpolation";
+  } catch (const Cancelled&) {
+    result = {kCancelled, {}};
   }
   if (!result.Ok()) values.clear();
   return result;

@@ -4,13 +4,12 @@
 // Values at scattered points turned into values of a grid's cells. docs/manual/interpolation.md has the formulas.
 #pragma once
 
-#include <atomic>
-#include <functional>
 #include <string>
 #include <vector>
 
 #include "platform/files.h"
 #include "platform/grid.h"
+#include "platform/progress.h"
 #include "platform/units.h"
 #include "platform/xyz_text.h"
 
@@ -26,10 +25,9 @@ enum class InterpolationMethod {
 
 struct InterpolationOptions {
   InterpolationMethod method = InterpolationMethod::InverseDistance;
-  double searchRadius = 1000;                 ///< In metres; a point at just that distance counts.
-  int threads = 1;                            ///< How many share the rows.
-  std::function<void(double done)> progress;  ///< From 0 to 1, now and then, in the calling thread.
-  const std::atomic<bool>* cancel = nullptr;  ///< May be set from elsewhere; asked for each few rows.
+  double searchRadius = 1000;  ///< In metres; a point at just that distance counts.
+  int threads = 1;             ///< How many share the rows.
+  ProgressPart progress;
 };
 
 /// A file of points with values.
@@ -44,11 +42,13 @@ struct ScatteredFile {
 
 /// Reads the points of a file in metres, their values in the base unit of the item type. Lines give their vertices.
 /// Shapes without a value are left out, and a note counts them.
-FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoint>& points);
+FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoint>& points,
+                             ProgressPart progress = {});
 
 /// The values of the grid's cells, row 0 the southern one; cells without a value get `deleteValue`. Points at the same
 /// place count as one with the mean of their values. Errors: a geometry or radius that is none, no points, a value that
-/// no grid can hold, "cancelled", no memory. Points on one line span no triangle, and a note says so.
+/// no grid can hold, "cancelled", no memory; then there are no values. Points on one line span no triangle, and a note
+/// says so.
 FileResult Interpolate(std::vector<ScatteredPoint> points, const GridGeometry& geometry, float deleteValue,
                        const InterpolationOptions& options, std::vector<float>& values);
 

@@ -22,8 +22,12 @@ int FirstCentre(double limit, int count) {
 
 }  // namespace
 
-PolygonRaster::PolygonRaster(const GridGeometry& geometry)
-    : nx_(geometry.nx), ny_(geometry.ny), transform_(geometry), rowStarts_(static_cast<std::size_t>(ny_) + 1) {}
+PolygonRaster::PolygonRaster(const GridGeometry& geometry, ProgressPart progress)
+    : nx_(geometry.nx),
+      ny_(geometry.ny),
+      transform_(geometry),
+      progress_(progress),
+      rowStarts_(static_cast<std::size_t>(ny_) + 1) {}
 
 template <class Found>
 void PolygonRaster::ForEdges(const Shape& shape, std::size_t first, std::size_t last, const Found& found) const {
@@ -39,6 +43,7 @@ void PolygonRaster::ForEdges(const Shape& shape, std::size_t first, std::size_t 
       before = point;
       const int rowBegin = FirstCentre(low.y, ny_), rowEnd = FirstCentre(high.y, ny_);
       if (rowBegin < rowEnd) found(low, high, rowBegin, rowEnd);
+      progress_.ThrowIfCancelled();
     }
   }
 }
@@ -84,6 +89,7 @@ void PolygonRaster::AddSpans(const Shape& shape, std::size_t first, std::size_t 
   for (std::size_t row = 0, at = 0; row < rows; at = rowStarts_[row++]) {
     const auto rowBegin = sorted_.begin() + static_cast<std::ptrdiff_t>(at);
     const auto rowEnd = sorted_.begin() + static_cast<std::ptrdiff_t>(rowStarts_[row]);
+    progress_.ThrowIfCancelled();
     std::sort(rowBegin, rowEnd, [](const Crossing& a, const Crossing& b) { return a.x < b.x; });
     for (auto it = rowBegin; it + 1 < rowEnd; it += 2) {
       const int from = FirstCentre(it->x, nx_), to = FirstCentre((it + 1)->x, nx_);
@@ -93,9 +99,10 @@ void PolygonRaster::AddSpans(const Shape& shape, std::size_t first, std::size_t 
 }
 
 void PutPolygons(const std::vector<Shape>& shapes, const std::vector<float>& codes, const GridGeometry& geometry,
-                 float deleteValue, std::vector<float>& values) {
-  PolygonRaster raster(geometry);
+                 float deleteValue, std::vector<float>& values, ProgressPart progress) {
+  PolygonRaster raster(geometry, progress);
   for (std::size_t k = 0; k < shapes.size(); ++k) {
+    progress.Tell(static_cast<double>(k) / static_cast<double>(shapes.size()));
     if (codes[k] == deleteValue) continue;
     for (const PolygonRaster::Span& span : raster.Spans(shapes[k], 0, shapes[k].parts.size())) {
       const auto row = values.begin() + static_cast<std::ptrdiff_t>(span.j) * geometry.nx;
@@ -104,18 +111,21 @@ void PutPolygons(const std::vector<Shape>& shapes, const std::vector<float>& cod
   }
 }
 
-std::vector<float> DomainOfPolygons(const std::vector<Shape>& shapes, const GridGeometry& geometry) {
+std::vector<float> DomainOfPolygons(const std::vector<Shape>& shapes, const GridGeometry& geometry,
+                                    ProgressPart progress) {
   // What lies in any single ring is within an outer one.
   constexpr unsigned char kOuter = 1, kInside = 2;
   std::vector<unsigned char> marks(geometry.CellCount());
-  PolygonRaster raster(geometry);
+  PolygonRaster raster(geometry, progress);
   const auto mark = [&](const Shape& shape, std::size_t first, std::size_t last, unsigned char bits) {
     for (const PolygonRaster::Span& span : raster.Spans(shape, first, last)) {
       const auto row = marks.begin() + static_cast<std::ptrdiff_t>(span.j) * geometry.nx;
       for (auto it = row + span.begin; it != row + span.end; ++it) *it = static_cast<unsigned char>(*it | bits);
     }
   };
+  const ProgressPart marking = progress.Part(0, 0.7), taking = progress.Part(0.7, 1);
   for (const Shape& shape : shapes) {
+    marking.Tell(static_cast<double>(&shape - shapes.data()) / static_cast<double>(shapes.size()));
     mark(shape, 0, shape.parts.size(), kInside | kOuter);
     for (std::size_t part = 0; shape.parts.size() > 1 && part < shape.parts.size(); ++part)
       mark(shape, part, part + 1, kOuter);
@@ -124,6 +134,8 @@ std::vector<float> DomainOfPolygons(const std::vector<Shape>& shapes, const Grid
   std::vector<float> values(geometry.CellCount(), kUsualDeleteValue);
   const std::ptrdiff_t nx = geometry.nx, ny = geometry.ny;
   for (std::ptrdiff_t j = 0; j < ny; ++j) {
+    taking.ThrowIfCancelled();
+    taking.Tell(static_cast<double>(j) / static_cast<double>(ny));
     for (std::ptrdiff_t i = 0; i < nx; ++i) {
       const unsigned char* const cell = marks.data() + j * nx + i;
       if (!(*cell & kInside)) continue;
@@ -169,9 +181,11 @@ std::string GiveCodes(const CYbShapeData& shapes, float deleteValue, ZoneTable& 
 }
 
 /// Reads a file of polygons, with the attribute unless that is null.
-FileResult ReadPolygons(const std::string& path, const std::string* attribute, int axisUnit, CYbShapeData& shapes) {
+FileResult ReadPolygons(const std::string& path, const std::string* attribute, int axisUnit, CYbShapeData& shapes,
+                        ProgressPart progress) {
   shapes.SetAxisLengthUnit(axisUnit);
-  FileResult result = attribute ? shapes.ReadShapeAndDbfFile(path, *attribute) : shapes.ReadShapeFile(path);
+  FileResult result =
+      attribute ? shapes.ReadShapeAndDbfFile(path, *attribute, progress) : shapes.ReadShapeFile(path, progress);
   if (result.Ok() && shapes.Kind() != ShapeKind::Polygon) {
     const bool isLine = shapes.Kind() == ShapeKind::Line;
     return {fmt::format("{}: polygons were expected, the file holds {}", path, isLine ? "lines" : "points"), {}};
@@ -179,10 +193,13 @@ FileResult ReadPolygons(const std::string& path, const std::string* attribute, i
   return result;
 }
 
+constexpr double kReading = 0.3;
+
 }  // namespace
 
 FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS_Polygon(GridGeometry geometry, float deleteValue,
-                                                                  const PolygonFile& file, ZoneTable& zones) {
+                                                                  const PolygonFile& file, ZoneTable& zones,
+                                                                  ProgressPart progress) {
   zones = {};
   const auto refused = [&file](std::string_view reason) {
     return FileResult{fmt::format("cannot use {}: {}", file.path, reason), {}};
@@ -190,7 +207,7 @@ FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS_Polygon(GridGeometry g
   if (const std::string problem = geometry.Problem(); !problem.empty()) return refused(problem);
   if (file.attribute.empty()) return refused("no attribute is selected");
   CYbShapeData shapes;
-  FileResult result = ReadPolygons(file.path, &file.attribute, file.axisUnit, shapes);
+  FileResult result = ReadPolygons(file.path, &file.attribute, file.axisUnit, shapes, progress.Part(0, kReading));
   if (!result.Ok()) return result;
   std::vector<float> codes;
   std::size_t left = 0;
@@ -206,10 +223,12 @@ FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS_Polygon(GridGeometry g
   }
   try {
     std::vector<float> values(geometry.CellCount(), fill);
-    PutPolygons(shapes.GetData(), codes, geometry, deleteValue, values);
+    PutPolygons(shapes.GetData(), codes, geometry, deleteValue, values, progress.Part(kReading, 1));
     result.error = TakeValues(std::move(geometry), std::move(values), deleteValue, kWholeNumberUnit, kCodeItemType);
   } catch (const std::bad_alloc&) {
     return refused("there is no memory for the grid");
+  } catch (const Cancelled&) {
+    return refused(kCancelled);
   }
   if (left > 0)
     result.note += fmt::format("{}{} shapes without a value are left out", result.note.empty() ? "" : "; ", left);
@@ -217,18 +236,19 @@ FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS_Polygon(GridGeometry g
 }
 
 FileResult CTvn2DOrthoRotatedGridData::MakeCatchmentGriddataFromShapefile(const std::string& path, int axisUnit,
-                                                                          GridGeometry geometry) {
+                                                                          GridGeometry geometry,
+                                                                          ProgressPart progress) {
   const auto refused = [&path](std::string_view reason) {
     return FileResult{fmt::format("cannot use {}: {}", path, reason), {}};
   };
   if (const std::string problem = geometry.Problem(); !problem.empty()) return refused(problem);
   CTvnShapeData shapes;
-  FileResult result = ReadPolygons(path, nullptr, axisUnit, shapes);
+  FileResult result = ReadPolygons(path, nullptr, axisUnit, shapes, progress.Part(0, kReading));
   if (!result.Ok()) return result;
   Envelope extent;
   if (!shapes.GetTranscribingRect(extent)) return refused("it holds no polygon");
   try {
-    std::vector<float> values = DomainOfPolygons(shapes.GetData(), geometry);
+    std::vector<float> values = DomainOfPolygons(shapes.GetData(), geometry, progress.Part(kReading, 1));
     if (std::all_of(values.begin(), values.end(), [](float value) { return value == kUsualDeleteValue; })) {
       const Envelope grid = EnvelopeOf(geometry);
       return refused(
@@ -240,6 +260,8 @@ FileResult CTvn2DOrthoRotatedGridData::MakeCatchmentGriddataFromShapefile(const 
         TakeValues(std::move(geometry), std::move(values), kUsualDeleteValue, kWholeNumberUnit, kCodeItemType);
   } catch (const std::bad_alloc&) {
     return refused("there is no memory for the grid");
+  } catch (const Cancelled&) {
+    return refused(kCancelled);
   }
   return result;
 }

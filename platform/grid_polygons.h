@@ -12,6 +12,7 @@
 
 #include "platform/files.h"
 #include "platform/grid.h"
+#include "platform/progress.h"
 #include "platform/shapes.h"
 
 namespace tervane {
@@ -38,14 +39,15 @@ struct ZoneTable {
 /// Polygons that were put on a grid, shape by shape.
 class PolygonRaster {
  public:
-  explicit PolygonRaster(const GridGeometry& geometry);
+  explicit PolygonRaster(const GridGeometry& geometry, ProgressPart progress = {});
 
   /// A part of a row: cells [begin, end) of row j.
   struct Span {
     int j, begin, end;
   };
   /// The cells whose centre lies inside by the even-odd rule over the given rings of the shape, [first, last) of its
-  /// parts. A ring need not be closed, may cross itself and lie anywhere. Valid until the next call.
+  /// parts. A ring need not be closed, may cross itself and lie anywhere. Valid until the next call. Throws
+  /// `Cancelled`; how far the work is, the caller tells.
   const std::vector<Span>& Spans(const Shape& shape, std::size_t first, std::size_t last);
 
  private:
@@ -61,6 +63,7 @@ class PolygonRaster {
 
   int nx_, ny_;
   GridTransform transform_;
+  ProgressPart progress_;
   std::vector<Crossing> crossings_, sorted_;
   std::vector<std::size_t> rowStarts_;
   std::vector<Span> spans_;
@@ -68,11 +71,13 @@ class PolygonRaster {
 
 /// Codes for the cells of a grid; `codes` has one for each shape, and where polygons overlap the later one counts.
 /// Shapes with the code `deleteValue` are left out. Cells in no polygon keep the value that they have in `values`.
+/// Throws `Cancelled`.
 void PutPolygons(const std::vector<Shape>& shapes, const std::vector<float>& codes, const GridGeometry& geometry,
-                 float deleteValue, std::vector<float>& values);
+                 float deleteValue, std::vector<float>& values, ProgressPart progress = {});
 
 /// The domain of a model: 1 in the cells of any of the polygons, 2 where one of the four neighbours lies outside the
-/// outer rings or off the grid (so that the edges of holes stay 1), `kUsualDeleteValue` elsewhere.
-std::vector<float> DomainOfPolygons(const std::vector<Shape>& shapes, const GridGeometry& geometry);
+/// outer rings or off the grid (so that the edges of holes stay 1), `kUsualDeleteValue` elsewhere. Throws `Cancelled`.
+std::vector<float> DomainOfPolygons(const std::vector<Shape>& shapes, const GridGeometry& geometry,
+                                    ProgressPart progress = {});
 
 }  // namespace tervane

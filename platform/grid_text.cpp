@@ -43,8 +43,13 @@ struct Heading {
 
 class GridTextReader {
  public:
-  GridTextReader(std::string_view text, const GridGeometry& place, float deleteValue)
-      : geometry(place), size_(text.size()), lines_(text), deleteValue_(deleteValue) {}
+  GridTextReader(std::string_view text, const GridGeometry& place, float deleteValue, ProgressPart progress)
+      : geometry(place),
+        size_(text.size()),
+        lines_(text),
+        told_(text, progress),
+        progress_(progress),
+        deleteValue_(deleteValue) {}
 
   /// Gives why the text is no grid.
   std::string Read() {
@@ -68,6 +73,7 @@ class GridTextReader {
     if (std::string reason = TakeHeading(); !reason.empty()) return reason;
     // The file's first row is the northern one, the grid's first the southern: the order is turned at the end.
     do {
+      told_.After(lines_);
       if (std::string reason = ReadRow(line); !reason.empty()) return reason;
     } while (lines_.Next(line));
     if (!heading_.ncols) geometry.ny = rows_;
@@ -121,6 +127,8 @@ class GridTextReader {
   }
 
   std::string ReadRow(std::string_view line) {
+    // A row may be as long as the whole file.
+    progress_.ThrowIfCancelled();
     const std::size_t before = values.size();
     for (std::string_view field = NextField(line, rules_); !field.empty(); field = NextField(line, rules_)) {
       double number = 0;
@@ -143,6 +151,8 @@ class GridTextReader {
 
   std::size_t size_;
   LineReader lines_;
+  LineProgress told_;
+  ProgressPart progress_;
   FieldRules rules_;
   Heading heading_;
   int rows_ = 0;
@@ -152,19 +162,23 @@ class GridTextReader {
 }  // namespace
 
 FileResult CTvn2DOrthoRotatedGridData::ReadTextFile(const std::string& path, const GridGeometry& place,
-                                                    float deleteValue, int itemUnit, int itemType) {
+                                                    float deleteValue, int itemUnit, int itemType,
+                                                    ProgressPart progress) {
+  constexpr double kReading = 0.2;
   FileContent content;
-  FileResult result = ReadWholeFile(path, content);
+  FileResult result = ReadWholeFile(path, content, progress.Part(0, kReading));
   if (!result.Ok()) return result;
   std::string reason = WhyNoText(content.Text());
   try {
-    GridTextReader reader(content.Text(), place, deleteValue);
+    GridTextReader reader(content.Text(), place, deleteValue, progress.Part(kReading, 1));
     if (reason.empty()) reason = reader.Read();
     if (reason.empty())
       reason = TakeValues(std::move(reader.geometry), std::move(reader.values), deleteValue, itemUnit, itemType);
     result.note = reader.note;
   } catch (const std::bad_alloc&) {
     reason = "there is no memory for its cells";
+  } catch (const Cancelled&) {
+    reason = kCancelled;
   }
   if (!reason.empty()) return {fmt::format("cannot read {} as a grid: {}", path, reason), {}};
   return result;

@@ -3,6 +3,7 @@
 #include "platform/row_workers.h"
 
 #include <algorithm>
+#include <atomic>
 #include <exception>
 #include <mutex>
 #include <system_error>
@@ -11,22 +12,20 @@
 
 namespace tervane {
 
-bool ForRows(int rows, int rowsAtOnce, int threads, const std::function<void(double)>& progress,
-             const std::atomic<bool>* cancel, const std::function<void(int begin, int end)>& work) {
+void ForRows(int rows, int rowsAtOnce, int threads, ProgressPart progress,
+             const std::function<void(int begin, int end)>& work) {
   const int blocks = rows / rowsAtOnce + (rows % rowsAtOnce != 0);
   std::atomic<int> next{0}, done{0};
-  std::atomic<bool> isCancelled{false}, isBroken{false};
+  std::atomic<bool> isBroken{false};
   std::mutex mutex;
   std::exception_ptr thrown;
-  const auto run = [&](bool isCaller) {
+  const auto run = [&] {
     try {
       for (int block = next++; block < blocks && !isBroken; block = next++) {
-        if (cancel && cancel->load(std::memory_order_relaxed)) isCancelled = true;
-        if (isCancelled) return;
+        if (progress.IsCancelled()) return;
         const int begin = block * rowsAtOnce;
         work(begin, begin + std::min(rowsAtOnce, rows - begin));
-        ++done;
-        if (isCaller && progress) progress(static_cast<double>(done) / blocks);
+        progress.Tell(static_cast<double>(++done) / blocks);
       }
     } catch (...) {
       const std::lock_guard lock(mutex);
@@ -36,15 +35,15 @@ bool ForRows(int rows, int rowsAtOnce, int threads, const std::function<void(dou
   };
   std::vector<std::jthread> others;
   try {
-    for (int i = 1; i < std::min(threads, blocks); ++i) others.emplace_back(run, false);
+    for (int i = 1; i < std::min(threads, blocks); ++i) others.emplace_back(run);
   } catch (const std::system_error&) {
     // The system gives no more threads: those that run do the work.
   }
-  run(true);
+  run();
   others.clear();
   if (thrown) std::rethrow_exception(thrown);
-  if (!isCancelled && progress) progress(1);
-  return !isCancelled;
+  // Also what `work` left off because of it is no result.
+  progress.ThrowIfCancelled();
 }
 
 }  // namespace tervane

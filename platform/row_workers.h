@@ -4,15 +4,16 @@
 // Work on the rows of a grid, shared among threads.
 #pragma once
 
-#include <atomic>
 #include <functional>
+
+#include "platform/progress.h"
 
 namespace tervane {
 
 /// Calls `work(begin, end)` for blocks of `rowsAtOnce` rows until all of [0, rows) are done, in as many threads as told
-/// (the calling one is one of them). Progress is told by the calling thread. False when `cancel` was set meanwhile.
-/// What `work` throws is thrown here once all threads have ended.
-bool ForRows(int rows, int rowsAtOnce, int threads, const std::function<void(double)>& progress,
-             const std::atomic<bool>* cancel, const std::function<void(int begin, int end)>& work);
+/// (the calling one is one of them). Throws `Cancelled` when it was to stop meanwhile, and what `work` throws, once all
+/// threads have ended.
+void ForRows(int rows, int rowsAtOnce, int threads, ProgressPart progress,
+             const std::function<void(int begin, int end)>& work);
 
 }  // namespace tervane

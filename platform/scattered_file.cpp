@@ -11,7 +11,7 @@
 
 namespace tervane {
 
-FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoint>& points) {
+FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoint>& points, ProgressPart progress) {
   points.clear();
   const auto refused = [&](std::string_view reason) {
     points.clear();
@@ -30,7 +30,7 @@ FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoi
   }
   FileResult result;
   if (file.isXyz) {
-    result = ReadXyzFile(file.path, points);
+    result = ReadXyzFile(file.path, points, progress);
     const UnitConversion toMetres = *ConversionBetween(axisUnit->scale, UnitScale{Dimension::Length});
     for (ScatteredPoint& point : points) point = {toMetres(point.x), toMetres(point.y), toBase(point.z)};
     return result;
@@ -38,7 +38,8 @@ FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoi
   CYbShapeData shapes;
   shapes.SetAxisLengthUnit(file.axisUnit);
   const bool isHeight = file.attribute.empty();
-  result = isHeight ? shapes.ReadShapeFile(file.path) : shapes.ReadShapeAndDbfFile(file.path, file.attribute);
+  result = isHeight ? shapes.ReadShapeFile(file.path, progress)
+                    : shapes.ReadShapeAndDbfFile(file.path, file.attribute, progress);
   if (!result.Ok()) return result;
   if (shapes.Kind() == ShapeKind::Polygon) return refused("points or lines were expected, the file holds polygons");
   if (!isHeight && shapes.Columns().front().kind == AttributeKind::Text) {
@@ -69,11 +70,14 @@ FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoi
 FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS(GridGeometry geometry, float deleteValue,
                                                           const ScatteredFile& file,
                                                           const InterpolationOptions& options) {
+  constexpr double kReading = 0.1;
   std::vector<ScatteredPoint> points;
-  FileResult read = ReadScatteredFile(file, points);
+  FileResult read = ReadScatteredFile(file, points, options.progress.Part(0, kReading));
   if (!read.Ok()) return read;
   std::vector<float> values;
-  FileResult result = Interpolate(std::move(points), geometry, deleteValue, options, values);
+  InterpolationOptions rest = options;
+  rest.progress = options.progress.Part(kReading, 1);
+  FileResult result = Interpolate(std::move(points), geometry, deleteValue, rest, values);
   const auto* const itemType = FindItemType(file.itemType);
   const int unit = itemType ? BaseUnit(*itemType).key : file.itemUnit;
   if (result.Ok()) result.error = TakeValues(std::move(geometry), std::move(values), deleteValue, unit, file.itemType);

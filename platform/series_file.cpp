@@ -12,7 +12,7 @@
 
 namespace tervane {
 
-FileResult WriteSeriesFile(const std::string& path, const NewSeries& series) {
+FileResult WriteSeriesFile(const std::string& path, const NewSeries& series, ProgressPart progress) {
   const ItemType* type = FindItemType(series.itemType);
   NewDataFile content;
   content.dimensions = 0;
@@ -22,10 +22,12 @@ FileResult WriteSeriesFile(const std::string& path, const NewSeries& series) {
   std::string error = writer.Create(path, content);
   for (std::size_t step = 0; step < series.times.size() && error.empty(); ++step) {
     error = writer.AddStep(series.times[step]);
-    if (error.empty()) error = writer.Put(1, {&series.values[step], 1});
+    if (error.empty()) error = writer.Put(1, {&series.values[step], 1}, {});
+    if (error.empty() && progress.IsCancelled()) error = fmt::format("cannot write {}: {}", path, kCancelled);
+    progress.Tell(static_cast<double>(step) / static_cast<double>(series.times.size()));
   }
   if (!error.empty()) return {std::move(error), {}};
-  return writer.Finish();
+  return writer.Finish(progress);
 }
 
 std::string ParseSeriesText(const std::string& text, NewSeries& series) {

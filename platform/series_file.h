@@ -9,6 +9,7 @@
 
 #include "platform/dates.h"
 #include "platform/files.h"
+#include "platform/progress.h"
 
 namespace tervane {
 
@@ -22,7 +23,7 @@ struct NewSeries {
 };
 
 /// Writes a series as a data file with one item, in place of a file of that name.
-FileResult WriteSeriesFile(const std::string& path, const NewSeries& series);
+FileResult WriteSeriesFile(const std::string& path, const NewSeries& series, ProgressPart progress = {});
 
 /// Dates and values as people paste them: a line each, separated by a tab, semicolon or comma behind the date. Errors
 /// tell the line; lines without a number at their end are heads where they stand first.

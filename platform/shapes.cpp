@@ -80,12 +80,15 @@ class ShapeFileReader {
   std::string projection;
   std::string note;
 
+  explicit ShapeFileReader(ProgressPart progress = {}) : progress_(progress) {}
+
   /// Reads the files into memory and opens them; with `isTableNeeded` the table must be there.
   Reason Open(const std::string& path, bool isTableNeeded) {
     path_ = path;
     if (!EqualIgnoringCase(ExtensionOf(path), ".shp"))
       return fmt::format("{} is no shape file: its name does not end in .shp", path);
-    if (const FileResult result = ReadWholeFile(path, shp_); !result.Ok()) return result.error;
+    if (const FileResult result = ReadWholeFile(path, shp_, progress_.Part(0, kReading)); !result.Ok())
+      return result.error;
     if (Reason reason = WhyNoShapes(shp_.Text()); !reason.empty()) return At(reason);
     files_.shp = {shp_.Text(), {}, false, true};
     FileContent prj;
@@ -125,7 +128,10 @@ class ShapeFileReader {
                          DBFGetRecordCount(table_.get()));
     }
     int deleted = 0;
+    const ProgressPart taking = progress_.Part(kReading, 1);
     for (int i = 0; i < count; ++i) {
+      if (taking.IsCancelled()) return At(kCancelled);
+      taking.Tell(static_cast<double>(i) / count);
       if (!columns.empty() && DBFIsRecordDeleted(table_.get(), i)) {
         ++deleted;
         continue;
@@ -153,7 +159,7 @@ class ShapeFileReader {
     for (char& c : upper) c = static_cast<char>(c >= 'a' && c <= 'z' ? c - 'a' + 'A' : c);
     for (const std::string& name : {WithExtension(extension), WithExtension(upper)}) {
       isThere = FileExists(name);
-      if (isThere) return ReadWholeFile(name, content).error;
+      if (isThere) return ReadWholeFile(name, content, progress_.Part(0, kReading)).error;
     }
     return {};
   }
@@ -280,6 +286,9 @@ class ShapeFileReader {
     return {};
   }
 
+  static constexpr double kReading = 0.3;  ///< What the files' bytes take of the whole time.
+
+  ProgressPart progress_;
   std::string path_;
   FileContent shp_, shx_, dbf_;
   MemoryFiles files_;
@@ -301,17 +310,20 @@ std::string TextOf(const ShapeValue& value) {
   return {};
 }
 
-FileResult CYbShapeData::ReadShapeFile(const std::string& path) { return Read(path, nullptr); }
-
-FileResult CYbShapeData::ReadShapeAndDbfFile(const std::string& path, const std::string& attribute) {
-  return Read(path, &attribute);
+FileResult CYbShapeData::ReadShapeFile(const std::string& path, ProgressPart progress) {
+  return Read(path, nullptr, progress);
 }
 
-FileResult CYbShapeData::Read(const std::string& path, const std::string* attribute) {
+FileResult CYbShapeData::ReadShapeAndDbfFile(const std::string& path, const std::string& attribute,
+                                             ProgressPart progress) {
+  return Read(path, &attribute, progress);
+}
+
+FileResult CYbShapeData::Read(const std::string& path, const std::string* attribute, ProgressPart progress) {
   const Unit* const unit = FindLengthUnit(axisUnit_);
   if (!unit) return {fmt::format("cannot read {}: the unit {} of its coordinates is no length", path, axisUnit_), {}};
   const UnitConversion toMetres = *ConversionBetween(unit->scale, UnitScale{Dimension::Length});
-  ShapeFileReader reader;
+  ShapeFileReader reader(progress);
   Reason reason;
   try {
     reason = reader.Open(path, attribute != nullptr);

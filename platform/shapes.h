@@ -67,10 +67,10 @@ class CYbShapeData {
   /// Reads the shapes and the projection. A missing index (.shx) is made anew from the shapes, and a note says so; a
   /// missing projection (.prj) is an empty text. Errors name file and shape (from 1) and say what is wrong; then the
   /// data are as they were.
-  FileResult ReadShapeFile(const std::string& path);
+  FileResult ReadShapeFile(const std::string& path, ProgressPart progress = {});
   /// The same with the values of one attribute (its name in any case), or of all with an empty name. The table must
   /// have a record for each shape. Shapes whose record is marked as deleted are left out, and a note counts them.
-  FileResult ReadShapeAndDbfFile(const std::string& path, const std::string& attribute);
+  FileResult ReadShapeAndDbfFile(const std::string& path, const std::string& attribute, ProgressPart progress = {});
 
   ShapeKind Kind() const { return kind_; }
   /// The attributes of the file, and those whose values the shapes hold.
@@ -81,7 +81,7 @@ class CYbShapeData {
   const std::string& Projection() const { return projection_; }
 
  protected:
-  FileResult Read(const std::string& path, const std::string* attribute);
+  FileResult Read(const std::string& path, const std::string* attribute, ProgressPart progress);
 
   int axisUnit_ = 1000;
   ShapeKind kind_ = ShapeKind::Polygon;

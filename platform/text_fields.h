@@ -10,6 +10,8 @@
 #include <string>
 #include <string_view>
 
+#include "platform/progress.h"
+
 namespace tervane {
 
 /// The lines of a text, which end in "\n" or "\r\n", or in "\r" where there is no "\n" at all; a byte order mark of
@@ -32,11 +34,30 @@ class LineReader {
   }
   /// Of the line that `Next` gave last, from 1.
   std::size_t Number() const { return number_; }
+  /// How many bytes are still to come.
+  std::size_t Left() const { return rest_.size(); }
 
  private:
   std::string_view rest_;
   char end_ = '\n';
   std::size_t number_ = 0;
+};
+
+/// Tells after every so many lines how far a text was read, and stops there when that is asked for.
+class LineProgress {
+ public:
+  LineProgress(std::string_view text, ProgressPart progress) : size_(text.size() + 1), progress_(progress) {}
+
+  void After(const LineReader& lines) const {
+    constexpr std::size_t kLines = 4096;
+    if (lines.Number() % kLines != 0) return;
+    progress_.ThrowIfCancelled();
+    progress_.Tell(1 - static_cast<double>(lines.Left()) / static_cast<double>(size_));
+  }
+
+ private:
+  std::size_t size_;
+  ProgressPart progress_;
 };
 
 /// How the fields of a line of numbers are told apart.

@@ -36,14 +36,17 @@ bool BeginsWithNumber(std::string_view line, FieldRules rules) {
   return ReadNumber(NextField(line, rules), rules, number);
 }
 
-FileResult ParseLines(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points) {
+FileResult ParseLines(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points,
+                      ProgressPart progress) {
   if (const std::string reason = WhyNoText(text); !reason.empty()) {
     return {fmt::format("cannot read {}: {}", path, reason), {}};
   }
   LineReader lines(text);
+  const LineProgress told(text, progress);
   FieldRules rules;
   std::string_view line;
   while (lines.Next(line)) {
+    told.After(lines);
     if (IsComment(Trimmed(line))) continue;
     if (points.empty()) {
       rules.isCommaDecimal = line.find(';') != std::string_view::npos;
@@ -63,23 +66,27 @@ FileResult ParseLines(std::string_view text, const std::string& path, std::vecto
 
 }  // namespace
 
-FileResult ParseXyz(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points) {
+FileResult ParseXyz(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points,
+                    ProgressPart progress) {
   points.clear();
   FileResult result;
   try {
-    result = ParseLines(text, path, points);
+    result = ParseLines(text, path, points, progress);
   } catch (const std::bad_alloc&) {
     result.error = fmt::format("cannot read {}: there is no memory for its points", path);
+  } catch (const Cancelled&) {
+    result.error = fmt::format("cannot read {}: {}", path, kCancelled);
   }
   if (!result.Ok()) points.clear();
   return result;
 }
 
-FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& points) {
+FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& points, ProgressPart progress) {
+  constexpr double kReading = 0.2;
   points.clear();
   FileContent content;
-  if (FileResult result = ReadWholeFile(path, content); !result.Ok()) return result;
-  return ParseXyz(content.Text(), path, points);
+  if (FileResult result = ReadWholeFile(path, content, progress.Part(0, kReading)); !result.Ok()) return result;
+  return ParseXyz(content.Text(), path, points, progress.Part(kReading, 1));
 }
 
 }  // namespace tervane

@@ -23,9 +23,10 @@ struct ScatteredPoint {
 /// first point has a semicolon, a comma is the decimal mark. Whatever stands before the first point and does not begin
 /// with a number is a heading; empty lines and lines that begin with `#`, `!` or `%` are left out everywhere. Columns
 /// behind the third are not read. Errors name file and line; then `points` is empty.
-FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& points);
+FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& points, ProgressPart progress = {});
 
 /// The same of a text; `path` stands in the messages.
-FileResult ParseXyz(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points);
+FileResult ParseXyz(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points,
+                    ProgressPart progress = {});
 
 }  // namespace tervane

@@ -530,7 +530,12 @@ class MapWidget : public ControlWidget {
   QWidget* FocusTarget() const override { return &view_->Canvas(); }
 
  protected:
-  void SyncValue() override { view_->Show(Described().map(), Described().displayUnits); }
+  void SyncValue() override {
+    if (Described().IsShown())
+      view_->ShowWhenThere(Described().map, Described().displayUnits);
+    else
+      view_->StopWaiting();
+  }
 
  private:
   MapView* view_;
@@ -547,7 +552,12 @@ class ChartWidget : public ControlWidget {
   QWidget* FocusTarget() const override { return plot_->FocusTarget(); }
 
  protected:
-  void SyncValue() override { plot_->Show(Described().chart()); }
+  void SyncValue() override {
+    if (Described().IsShown())
+      plot_->ShowWhenThere(Described().chart);
+    else
+      plot_->StopWaiting();
+  }
 
  private:
   SeriesPlot* plot_;

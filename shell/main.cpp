@@ -20,6 +20,7 @@
 #include "platform/os.h"
 #include "shell/document_frame.h"
 #include "shell/main_window.h"
+#include "shell/plot_frame.h"
 #include "shell/program.h"
 #include "shell/qt_text.h"
 #include "shell/theme.h"
@@ -92,8 +93,12 @@ int Run(const Typed& typed, QApplication& application) {
     QTimer::singleShot(0, &window, [&window] { window.OfferRecoveries(); });
     return QApplication::exec();
   }
-  // Layouts settle when events have run.
+  // Layouts settle when events have run, and maps when they are computed.
   for (int i = 0; i < 3; ++i) application.processEvents();
+  const auto isBusy = [&window] {
+    return std::ranges::any_of(window.findChildren<PlotFrame*>(), [](const auto* plot) { return plot->IsBusy(); });
+  };
+  while (isBusy()) application.processEvents(QEventLoop::WaitForMoreEvents);
   if (!WithFewColors(window.grab().toImage()).save(ToQt(typed.screenshot))) {
     std::fprintf(stderr, "quarzel: %s cannot be written\n", typed.screenshot.c_str());
     return 2;

@@ -218,6 +218,10 @@ MapPick MapCanvas::PickAt(MapPoint place) const {
     }
   }
   if (!shapes_.empty()) pick.shape = shapes_.front().At(place, Reach());
+  if (pick.shape) {
+    const Shape& shape = content_.shapes.front().shapes->GetData()[*pick.shape];
+    if (shape.HasValue()) pick.shapeValue = TextOf(shape.Value());
+  }
   return pick;
 }
 
@@ -238,8 +242,7 @@ QString MapCanvas::TextAt(MapPoint place) const {
                                 : tr("no value"));
   }
   if (pick.shape) {
-    const Shape& shape = content_.shapes.front().shapes->GetData()[*pick.shape];
-    const QString value = shape.HasValue() ? ToQt(TextOf(shape.Value())) : QString();
+    const QString value = ToQt(pick.shapeValue);
     text += "   " + (value.isEmpty() ? tr("shape %1").arg(*pick.shape + 1)
                                      : tr("shape %1: %2").arg(*pick.shape + 1).arg(value));
   }

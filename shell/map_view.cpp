@@ -25,4 +25,15 @@ void MapView::Show(MapContent content, const DisplayUnits* units) {
   SetStatus(canvas_->Summary());
 }
 
+void MapView::ShowWhenThere(const std::function<MapContent()>& content, const DisplayUnits* units) {
+  MapContent now = Follow<MapContent>(content, [this, content, units] { ShowWhenThere(content, units); });
+  if (!now.awaited.empty() && isShown_) return;
+  // Nothing is said of an empty map that is still to come.
+  if (!now.awaited.empty() && now.message.empty()) now.message = " ";
+  now.awaited.clear();
+  Show(std::move(now), units);
+}
+
+bool MapView::IsBusy() const { return PlotFrame::IsBusy() || canvas_->IsPreparing(); }
+
 }  // namespace tervane

@@ -21,6 +21,9 @@ class MapView : public PlotFrame {
 
   /// Shows what there is to show, in the user's units (null for base units); draws anew only where something differs.
   void Show(MapContent content, const DisplayUnits* units);
+  /// The same of content that may have to be computed: what is shown stays until that is done.
+  void ShowWhenThere(const std::function<MapContent()>& content, const DisplayUnits* units);
+  bool IsBusy() const override;
   MapCanvas& Canvas() const { return *canvas_; }
 
  private:

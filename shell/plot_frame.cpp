@@ -9,10 +9,12 @@
 #include <QLabel>
 #include <QToolButton>
 #include <QVBoxLayout>
+#include <utility>
 
 #include "platform/files.h"
 #include "shell/qt_text.h"
 #include "shell/theme.h"
+#include "shell/wait_panel.h"
 
 namespace tervane {
 
@@ -20,6 +22,7 @@ namespace {
 
 constexpr double kZoomStep = 1.5;
 constexpr int kNarrow = 460;       ///< In pixels at zoom 1: below, the line breaks into two.
+constexpr int kMoment = 40;        ///< In milliseconds: what takes no longer appears at once.
 constexpr double kPaperRatio = 2;  ///< Pixels of a picture for one of the screen.
 
 /// A text in one line that gives way where there is no room.
@@ -68,6 +71,32 @@ void PlotFrame::Hold(Plot plot) {
   AddCommand(tr("&Export as PNG..."), [this] { Export(); });
   connect(&Theme::Get(), &Theme::Changed, this, &PlotFrame::FollowTheme);
   FollowTheme();
+  panel_ = new WaitPanel(background_, *plot_.widget);
+  connect(&background_, &Background::Ended, this, [this] {
+    panel_->Sync();
+    // A page that was left is hidden first, and what it speaks of may be gone.
+    isAgainDue_ = !isVisible();
+    if (isVisible()) again_();
+  });
+}
+
+bool PlotFrame::IsThereInAMoment(const Awaited& awaited, const std::function<void()>& again) {
+  again_ = again;
+  isAgainDue_ = false;
+  const bool isThere = background_.Await(awaited) && background_.IsDoneWithin(kMoment);
+  if (!isThere) panel_->Sync();
+  return isThere;
+}
+
+void PlotFrame::StopWaiting() {
+  background_.StopWaiting();
+  isAgainDue_ = false;
+  panel_->Sync();
+}
+
+void PlotFrame::showEvent(QShowEvent* event) {
+  QWidget::showEvent(event);
+  if (std::exchange(isAgainDue_, false)) again_();
 }
 
 QAction* PlotFrame::AddCommand(const QString& text, std::function<void()> command) {

@@ -139,6 +139,15 @@ void SeriesPlot::Show(SeriesContent content) {
   Build();
 }
 
+void SeriesPlot::ShowWhenThere(const std::function<SeriesContent()>& content) {
+  SeriesContent now = Follow<SeriesContent>(content, [this, content] { ShowWhenThere(content); });
+  if (!now.awaited.empty() && isShown_) return;
+  // Nothing is said of an empty chart that is still to come.
+  if (!now.awaited.empty() && now.message.empty()) now.message = " ";
+  now.awaited.clear();
+  Show(std::move(now));
+}
+
 void SeriesPlot::Build() {
   chart_->clearPlottables();
   chart_->clearItems();

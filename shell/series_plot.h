@@ -33,6 +33,8 @@ class SeriesPlot : public PlotFrame {
 
   /// Shows what there is to show; draws anew only where something differs.
   void Show(SeriesContent content);
+  /// The same of content that may have to be computed: what is shown stays until that is done.
+  void ShowWhenThere(const std::function<SeriesContent()>& content);
   QCustomPlot& Chart() const { return *chart_; }
   QWidget* FocusTarget() const;
   /// The values of all series that the user sees at a time, in seconds since 1970.

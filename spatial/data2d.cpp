@@ -2,8 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "spatial/data2d.h"
 
-#include "platform/grid_files.h"
+#include <algorithm>
+#include <thread>
+
+#include <fmt/format.h>
+
 #include "platform/grid_polygons.h"
+#include "platform/paths.h"
 #include "platform/units.h"
 #include "simspec/model_components.h"
 #include "spatial/domain.h"
@@ -22,9 +27,9 @@ int FirstUnit(int itemType) {
 
 }  // namespace
 
-FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work, CTvn2DOrthoRotatedGridData& grid) {
+FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid) {
   // The file's own geometry counts; nothing is resampled.
-  if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid);
+  if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid, progress);
   const bool isXyz = source.type == CData2DKvf::kXyzFile;
   if (source.itemType == kCodeItemType && !isXyz) {
     PolygonFile polygons;
@@ -32,7 +37,7 @@ FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work,
     polygons.attribute = source.attribute;
     polygons.axisUnit = source.axisUnit;
     ZoneTable zones;
-    return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones);
+    return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, progress);
   }
   ScatteredFile points;
   points.path = source.file;
@@ -41,9 +46,11 @@ FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work,
   points.axisUnit = source.axisUnit;
   points.itemUnit = source.itemUnit;
   points.itemType = source.itemType;
-  InterpolationOptions options = work;
+  InterpolationOptions options;
   options.method = static_cast<InterpolationMethod>(source.interpMethod);
   options.searchRadius = source.searchRadius;
+  options.threads = std::max(1, static_cast<int>(std::thread::hardware_concurrency()));
+  options.progress = progress;
   return grid.CreateGridData_GIS(source.geometry, kUsualDeleteValue, points, options);
 }
 
@@ -119,38 +126,59 @@ std::shared_ptr<CTvn2DOrthoRotatedGridData> CData2DKvf::CreateGridData(std::stri
   const GridSource source = CurrentSource();
   if (source.type == kUniform) return nullptr;
   auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
-  InterpolationOptions work;
-  work.threads = 2;
-  const FileResult result = BuildGrid(source, work, *grid);
+  const FileResult result = BuildGrid(source, {}, *grid);
   if (problem) *problem = result.error;
   if (!result.Ok()) return nullptr;
   if (source.type == kShapeFile) grid->SetItemName(GetTitle());
   return grid;
 }
 
-std::shared_ptr<const CTvn2DOrthoRotatedGridData> CData2DKvf::GetGridData(std::string* problem) {
+std::shared_ptr<ComputedGrid> CData2DKvf::GridComputation() {
   GridSource source = CurrentSource();
+  if (source.type == kUniform) return nullptr;
   if (!kept_ || !(kept_->source == source)) {
-    std::string why;
-    auto grid = CreateGridData(&why);
-    kept_ = Kept{std::move(source), std::move(grid), std::move(why)};
+    const char* const verb = source.type == kGridFile ? "Reading" : IsCode() ? "Computing codes of" : "Interpolating";
+    const std::string name = source.type == kShapeFile ? GetTitle() : std::string();
+    auto made = std::make_shared<ComputedGrid>(fmt::format("{} {}", verb, FileNameOf(source.file)),
+                                               [source, name](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
+                                                 FileResult result = BuildGrid(source, progress, grid);
+                                                 if (!name.empty()) grid.SetItemName(name);
+                                                 return result;
+                                               });
+    kept_ = {std::move(source), std::move(made)};
   }
-  if (problem) *problem = kept_->problem;
-  return kept_->grid;
+  return kept_->computation;
 }
 
-std::shared_ptr<const CYbShapeData> CData2DKvf::GetShapeData(std::string* problem) {
+std::shared_ptr<const CTvn2DOrthoRotatedGridData> CData2DKvf::GetGridData(std::string* problem) {
+  const auto grid = GridComputation();
+  if (!grid) return nullptr;
+  grid->Run();
+  if (problem) *problem = grid->Problem();
+  return grid->Result();
+}
+
+std::shared_ptr<Computed<CTvnShapeData>> CData2DKvf::ShapeComputation() {
   if (Type != kShapeFile && Type != kXyzFile) return nullptr;
   GridSource source = CurrentSource();
   if (!keptShapes_ || !(keptShapes_->source == source)) {
-    auto shapes = std::make_shared<CTvnShapeData>();
-    shapes->SetAxisLengthUnit(ShapeAxisUnit);
-    const FileResult result = Type == kXyzFile ? ReadXyzShapes(source.file, ShapeAxisUnit, *shapes)
-                                               : shapes->ReadShapeAndDbfFile(source.file, source.attribute);
-    keptShapes_ = KeptShapes{std::move(source), result.Ok() ? shapes : nullptr, result.error};
+    auto made = std::make_shared<Computed<CTvnShapeData>>(
+        fmt::format("Reading {}", FileNameOf(source.file)), [source](CTvnShapeData& shapes, ProgressPart progress) {
+          if (source.type == kXyzFile) return ReadXyzShapes(source.file, source.axisUnit, shapes, progress);
+          shapes.SetAxisLengthUnit(source.axisUnit);
+          return shapes.ReadShapeAndDbfFile(source.file, source.attribute, progress);
+        });
+    keptShapes_ = {std::move(source), std::move(made)};
   }
-  if (problem) *problem = keptShapes_->problem;
-  return keptShapes_->shapes;
+  return keptShapes_->computation;
+}
+
+std::shared_ptr<const CYbShapeData> CData2DKvf::GetShapeData(std::string* problem) {
+  const auto shapes = ShapeComputation();
+  if (!shapes) return nullptr;
+  shapes->Run();
+  if (problem) *problem = shapes->Problem();
+  return shapes->Result();
 }
 
 void CData2DKvf::SetGridDataValid(int valid) {

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "platform/grid.h"
+#include "platform/grid_files.h"
 #include "platform/grid_interpolation.h"
 #include "spatial/file_nodes.h"
 
@@ -42,7 +43,7 @@ struct GridSource {
 };
 
 /// Makes the grid of a source; it asks no node, so that another thread may do it. `grid` stays as it was on failure.
-FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work, CTvn2DOrthoRotatedGridData& grid);
+FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid);
 
 class CData2DKvf : public CTvnKvfBase {
  public:
@@ -76,12 +77,16 @@ class CData2DKvf : public CTvnKvfBase {
 
   /// What decides the grid now.
   GridSource CurrentSource() const;
-  /// The grid, built when what decides it has changed since it was built last; null for a uniform value and where it
-  /// cannot be built, and then `problem` says why.
+  /// The building of the grid: another one when what decides the grid has changed; null for a uniform value. It asks no
+  /// node.
+  std::shared_ptr<ComputedGrid> GridComputation();
+  /// The grid, built here and now if it is not there yet; null for a uniform value and where it cannot be built, and
+  /// then `problem` says why.
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> GetGridData(std::string* problem = nullptr);
   /// A new grid; the one that is kept is left alone.
   std::shared_ptr<CTvn2DOrthoRotatedGridData> CreateGridData(std::string* problem = nullptr) const;
-  /// Shapes or points as they are in their file, kept likewise; null for other sources.
+  /// The same of shapes or points as they are in their file; null for other sources.
+  std::shared_ptr<Computed<CTvnShapeData>> ShapeComputation();
   std::shared_ptr<const CYbShapeData> GetShapeData(std::string* problem = nullptr);
   /// With 0 the next call builds anew.
   void SetGridDataValid(int valid);
@@ -98,18 +103,13 @@ class CData2DKvf : public CTvnKvfBase {
   CData2DShpFile* shapeFile_;
   CData2DXyzFile* xyzFile_;
 
+  template <class Data>
   struct Kept {
     GridSource source;
-    std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid;
-    std::string problem;
+    std::shared_ptr<Computed<Data>> computation;
   };
-  std::optional<Kept> kept_;
-  struct KeptShapes {
-    GridSource source;
-    std::shared_ptr<const CYbShapeData> shapes;
-    std::string problem;
-  };
-  std::optional<KeptShapes> keptShapes_;
+  std::optional<Kept<CTvn2DOrthoRotatedGridData>> kept_;
+  std::optional<Kept<CTvnShapeData>> keptShapes_;
 };
 
 /// The ground surface.

@@ -8,7 +8,7 @@
 #include <fmt/format.h>
 
 #include "platform/cart.h"
-#include "platform/grid_files.h"
+#include "platform/paths.h"
 #include "platform/units.h"
 #include "spatial/pages.h"
 
@@ -54,10 +54,30 @@ std::shared_ptr<CTvn2DOrthoRotatedGridData> CCatchmentKvf::GetDomainGrid(std::st
 
 std::shared_ptr<CTvn2DOrthoRotatedGridData> CCatchmentKvf::GetDomainFromShape(std::string* problem) const {
   auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
-  const FileResult result = grid->MakeCatchmentGriddataFromShapefile(
-      shapeFile_->File.Absolute(), ShapeAxisUnit, {nxShp, nyShp, sizeShp, x0Shp, y0Shp, rotationShp, MapProjShp});
+  const FileResult result = BuildFromShape(CurrentShape(), {}, *grid);
   if (problem) *problem = result.error;
   return result.Ok() ? grid : nullptr;
+}
+
+CCatchmentKvf::ShapeSource CCatchmentKvf::CurrentShape() const {
+  const std::string file = shapeFile_->File.Absolute();
+  return {file, StampOf(file), ShapeAxisUnit, {nxShp, nyShp, sizeShp, x0Shp, y0Shp, rotationShp, MapProjShp}};
+}
+
+FileResult CCatchmentKvf::BuildFromShape(const ShapeSource& source, ProgressPart progress,
+                                         CTvn2DOrthoRotatedGridData& grid) {
+  return grid.MakeCatchmentGriddataFromShapefile(source.file, source.axisUnit, source.geometry, progress);
+}
+
+std::shared_ptr<ComputedGrid> CCatchmentKvf::DomainFromShape() {
+  ShapeSource source = CurrentShape();
+  if (made_ && madeOf_ == source) return made_;
+  made_ = std::make_shared<ComputedGrid>(fmt::format("Computing the domain of {}", FileNameOf(source.file)),
+                                         [source](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
+                                           return BuildFromShape(source, progress, grid);
+                                         });
+  madeOf_ = std::move(source);
+  return made_;
 }
 
 std::shared_ptr<const CYbShapeData> CCatchmentKvf::GetDomainShape(std::string* problem) const {

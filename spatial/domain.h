@@ -6,6 +6,7 @@
 #include <string>
 
 #include "platform/grid.h"
+#include "platform/grid_files.h"
 #include "platform/shapes.h"
 #include "spatial/file_nodes.h"
 
@@ -45,6 +46,8 @@ class CCatchmentKvf : public CTvnKvfBase {
   /// The domain as a grid, built anew; null with the reason in `problem` when that is not possible.
   std::shared_ptr<CTvn2DOrthoRotatedGridData> GetDomainGrid(std::string* problem = nullptr) const;
   std::shared_ptr<CTvn2DOrthoRotatedGridData> GetDomainFromShape(std::string* problem = nullptr) const;
+  /// The making of that: another one when what decides it has changed. It asks no node.
+  std::shared_ptr<ComputedGrid> DomainFromShape();
   /// The shape file, for drawing; null when it cannot be read.
   std::shared_ptr<const CYbShapeData> GetDomainShape(std::string* problem = nullptr) const;
 
@@ -58,8 +61,22 @@ class CCatchmentKvf : public CTvnKvfBase {
   void ExchangeKeys(KeyExchange& keys) override;
 
  private:
+  /// All that decides the domain of a shape file.
+  struct ShapeSource {
+    std::string file;
+    FileStamp stamp;
+    int axisUnit = 0;
+    GridGeometry geometry;
+
+    bool operator==(const ShapeSource&) const = default;
+  };
+  static FileResult BuildFromShape(const ShapeSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid);
+  ShapeSource CurrentShape() const;
+
   CTvnData2DNdsFile* gridFile_;
   CData2DShpFile* shapeFile_;
+  ShapeSource madeOf_;
+  std::shared_ptr<ComputedGrid> made_;
 };
 
 }  // namespace tervane

@@ -22,15 +22,16 @@ void CData2DDlg::OnRefresh() {
 
 MapContent CData2DDlg::Map() {
   CData2DKvf& n = Node();
-  std::string problem;
   const bool isScattered = n.Type == CData2DKvf::kShapeFile || n.Type == CData2DKvf::kXyzFile;
   if (!n.ShowGridData && !(isScattered && n.ShowShapeData)) return {};
-  const auto grid = n.ShowGridData ? n.GetGridData(&problem) : nullptr;
-  MapContent map = GridMap(n, grid, problem);
-  if (grid) map.grids.front().isCodes = n.IsCode();
-  if (isScattered && n.ShowShapeData)
-    if (auto shapes = n.GetShapeData(problem.empty() ? &map.message : nullptr))
-      map.shapes.push_back({std::move(shapes), {}});
+  MapContent map = GridMap(n, n.ShowGridData ? n.GridComputation() : nullptr);
+  if (!map.grids.empty()) map.grids.front().isCodes = n.IsCode();
+  if (!isScattered || !n.ShowShapeData) return map;
+  const auto shapes = n.ShapeComputation();
+  if (auto data = NowOrAwaited(shapes, map.awaited))
+    map.shapes.push_back({std::move(data), {}});
+  else if (shapes->IsDone() && map.message.empty())
+    map.message = shapes->Problem();
   return map;
 }
 
@@ -85,7 +86,10 @@ void CData2DDlg::Describe(PageForm& form) {
               })
       .Beside()
       .ShownWhen(is(CData2DKvf::kGridFile));
-  form.Button("Edit...", [this] { Outside().OpenBrowser("file://" + Node().XyzFile().File.Absolute()); })
+  form.Button("Edit...",
+              [this] {
+                if (Context().openDataFile) Context().openDataFile(Node().XyzFile().File.Absolute());
+              })
       .ShownWhen(is(CData2DKvf::kXyzFile));
   if (n.HasRelativeToGround()) form.Check("Values relative to ground", n.RelativeToGround);
 

@@ -2,6 +2,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/spatial/domain_pages.h"
 
+#include <algorithm>
+#include <iterator>
+
 #include "pages/spatial/create_dialogs.h"
 #include "pages/spatial/plot_content.h"
 #include "platform/cart.h"
@@ -101,7 +104,7 @@ void CCatchmentDlg::Describe(PageForm& form) {
 }
 
 MapContent CCatchmentDlg::Map() {
-  const CCatchmentKvf& n = Node();
+  CCatchmentKvf& n = Node();
   if (n.Type == CCatchmentKvf::kGridFile) {
     MapContent map = FileMap(n.GridFile());
     if (!map.grids.empty()) {
@@ -111,16 +114,11 @@ MapContent CCatchmentDlg::Map() {
     return map;
   }
   if (n.ShapeFile().File.IsEmpty()) return GridMap(n, nullptr, "No file is chosen.");
-  const std::string file = n.ShapeFile().File.Absolute();
-  Made made{n.GetModelGeometry(), file, StampOf(file), n.ShapeAxisUnit};
-  if (!made_ || !(*made_ == made)) {
-    grid_ = n.GetDomainFromShape(&problem_);
-    shapes_ = n.GetDomainShape();
-    made_ = std::move(made);
-  }
-  MapContent map = GridMap(n, grid_, problem_);
+  MapContent map = GridMap(n, n.DomainFromShape());
   if (!map.grids.empty()) map.grids.front().isCodes = true;
-  if (shapes_) map.shapes.push_back({shapes_, {}});
+  MapContent outline = ShapeFileMap(n.ShapeFile(), n.ShapeAxisUnit);
+  std::ranges::move(outline.shapes, std::back_inserter(map.shapes));
+  std::ranges::move(outline.awaited, std::back_inserter(map.awaited));
   return map;
 }
 

@@ -21,19 +21,6 @@ class CCatchmentDlg : public PageOf<CCatchmentKvf> {
   Control& GridNumber(PageForm& form, const std::string& label, double& own, double GridGeometry::*inFile);
   bool BrowseShape(Host& host, const Host::FileQuestion& question);
   MapContent Map();
-
-  /// The domain that was made last, and what it was made of.
-  struct Made {
-    GridGeometry geometry;
-    std::string file;
-    FileStamp stamp;
-    int axisUnit = 0;
-    bool operator==(const Made&) const = default;
-  };
-  std::optional<Made> made_;
-  std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid_;
-  std::shared_ptr<const CYbShapeData> shapes_;
-  std::string problem_;
 };
 
 }  // namespace tervane

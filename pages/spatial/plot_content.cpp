@@ -13,7 +13,7 @@
 #include "exchange/grid_state.h"
 #include "exchange/overlays.h"
 #include "platform/datafile.h"
-#include "platform/grid_files.h"
+#include "platform/paths.h"
 #include "simspec/periods.h"
 
 namespace tervane {
@@ -26,52 +26,101 @@ constexpr std::size_t kMostValues = 2'000'000;
 template <class Key, class Data>
 class RecentFiles {
  public:
-  struct Entry {
-    Key key;
-    std::shared_ptr<const Data> data;
-    std::string problem;
-  };
-  template <class Read>
-  const Entry& Get(Key key, const Read& read) {
+  using Result = std::shared_ptr<Computed<Data>>;
+
+  template <class Maker>
+  Result Get(Key key, const std::string& path, Maker maker) {
     const auto found = std::ranges::find(entries_, key, &Entry::key);
     if (found != entries_.end()) {
       std::rotate(entries_.begin(), found, found + 1);
-      return entries_.front();
+      return entries_.front().result;
     }
-    auto data = std::make_shared<Data>();
-    FileResult result = read(*data);
-    entries_.push_front({std::move(key), result.Ok() ? data : nullptr, std::move(result.error)});
-    if (entries_.size() > kMostFiles) entries_.pop_back();
-    return entries_.front();
+    auto result = std::make_shared<Computed<Data>>(fmt::format("Reading {}", FileNameOf(path)), std::move(maker));
+    entries_.push_front({std::move(key), result});
+    LetGo();
+    return result;
   }
 
  private:
+  struct Entry {
+    Key key;
+    Result result;
+
+    /// Somebody shows it, or waits for it.
+    bool IsInUse() const {
+      return result.use_count() > 1 || (result->IsDone() && result->Result() && result->Result().use_count() > 1);
+    }
+  };
+
+  /// Forgets what has not been asked for for the longest time. What is in use needs its memory anyway, and a map of
+  /// many files would never be complete if they drove each other out.
+  void LetGo() {
+    std::size_t count = 0;
+    std::erase_if(entries_, [&](const Entry& entry) { return !entry.IsInUse() && ++count > kMostFiles; });
+  }
+
   static constexpr std::size_t kMostFiles = 8;
   std::deque<Entry> entries_;
 };
+
+/// The values of an item over all times.
+FileResult ReadSeries(const std::string& path, int number, Series& series, ProgressPart progress) {
+  DataFile file;
+  const auto refused = [](std::string reason) { return FileResult{std::move(reason), {}}; };
+  if (std::string problem = file.Open(path); !problem.empty()) return refused(std::move(problem));
+  if (number < 1 || number > static_cast<int>(file.Items().size()))
+    return refused(fmt::format("there is no item {}: the file has {}", number, file.Items().size()));
+  const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)];
+  if (item.dimensions != 0 || !file.Time().hasDates) return refused("It is no time series.");
+  if (file.Time().steps > kMostValues)
+    return refused(fmt::format("It has {} steps, too many to be shown.", file.Time().steps));
+  std::vector<float> values(file.Time().steps);
+  if (std::string problem = file.Read({number, 0, values.size(), {}}, values, {}, progress); !problem.empty())
+    return refused(std::move(problem));
+  series.name = item.name;
+  series.unit = item.unitText;
+  series.isStepped = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
+  for (std::size_t step = 0; step < values.size(); ++step) {
+    series.times.push_back(file.Time().Stamp(step));
+    series.values.push_back(values[step] == kDeleteValue ? std::numeric_limits<double>::quiet_NaN()
+                                                         : static_cast<double>(values[step]));
+  }
+  return {};
+}
 
 struct FileKey {
   std::string path;
   FileStamp stamp;
   int item = 0;           ///< Or the unit of coordinates.
   std::string attribute;  ///< Of a shape file.
+  GridSlice slice;
 
   bool operator==(const FileKey&) const = default;
 };
 
-using GridEntry = RecentFiles<FileKey, CTvn2DOrthoRotatedGridData>::Entry;
-const GridEntry& RecentGrid(const std::string& path, int item) {
+std::shared_ptr<ComputedGrid> RecentGrid(const std::string& path, int item, const GridSlice& slice = {}) {
   static RecentFiles<FileKey, CTvn2DOrthoRotatedGridData> grids;
-  return grids.Get({path, StampOf(path), item, {}},
-                   [&](CTvn2DOrthoRotatedGridData& grid) { return ReadGridData(path, item, grid); });
+  return grids.Get({path, StampOf(path), item, {}, slice}, path,
+                   [path, item, slice](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
+                     return ReadGridData(path, item, grid, progress, slice);
+                   });
 }
 
-using ShapeEntry = RecentFiles<FileKey, CTvnShapeData>::Entry;
-const ShapeEntry& RecentShapes(const std::string& path, const std::string& attribute, int axisUnit) {
+std::shared_ptr<Computed<CTvnShapeData>> RecentShapes(const std::string& path, const std::string& attribute,
+                                                      int axisUnit) {
   static RecentFiles<FileKey, CTvnShapeData> files;
-  return files.Get({path, StampOf(path), axisUnit, attribute}, [&](CTvnShapeData& shapes) {
-    shapes.SetAxisLengthUnit(axisUnit);
-    return attribute.empty() ? shapes.ReadShapeFile(path) : shapes.ReadShapeAndDbfFile(path, attribute);
+  return files.Get({path, StampOf(path), axisUnit, attribute, {}}, path,
+                   [path, attribute, axisUnit](CTvnShapeData& shapes, ProgressPart progress) {
+                     shapes.SetAxisLengthUnit(axisUnit);
+                     return attribute.empty() ? shapes.ReadShapeFile(path, progress)
+                                              : shapes.ReadShapeAndDbfFile(path, attribute, progress);
+                   });
+}
+
+std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item) {
+  static RecentFiles<FileKey, Series> files;
+  return files.Get({path, StampOf(path), item, {}, {}}, path, [path, item](Series& series, ProgressPart progress) {
+    return ReadSeries(path, item, series, progress);
   });
 }
 
@@ -85,13 +134,13 @@ void AddLayers(const COverlayListKvf& list, MapContent& map) {
     if (!layer || !layer->Display || layer->LayerFile().IsEmpty()) continue;
     if (const auto* grid = dynamic_cast<const COverlayGridKvf*>(layer)) {
       GridLayer drawn;
-      drawn.grid = RecentGrid(grid->LayerFile().Absolute(), grid->GridFile().SelectedItem()).data;
+      drawn.grid = NowOrAwaited(RecentGrid(grid->LayerFile().Absolute(), grid->GridFile().SelectedItem()), map.awaited);
       if (!drawn.grid) continue;
       drawn.withLegend = false;
       drawn.transparency = std::min(1.0, static_cast<double>(grid->Transparency));
       map.grids.push_back(std::move(drawn));
     } else if (const auto* shape = dynamic_cast<const COverlayShapeKvf*>(layer)) {
-      if (auto data = RecentShapes(shape->LayerFile().Absolute(), {}, shape->ShapeAxisUnit).data)
+      if (auto data = NowOrAwaited(RecentShapes(shape->LayerFile().Absolute(), {}, shape->ShapeAxisUnit), map.awaited))
         map.shapes.push_back({std::move(data), {}});
     }
   }
@@ -116,10 +165,17 @@ MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRo
   return map;
 }
 
-MapContent FileMap(const DataFileNode& file) {
+MapContent GridMap(const CYbSEKvfBase& node, const std::shared_ptr<ComputedGrid>& grid) {
+  if (!grid) return GridMap(node, nullptr, std::string());
+  if (grid->IsDone()) return GridMap(node, grid->Result(), grid->Problem());
+  MapContent map;
+  map.awaited.push_back(grid);
+  return map;
+}
+
+MapContent FileMap(const DataFileNode& file, const GridSlice& slice) {
   if (file.File.IsEmpty()) return GridMap(file, nullptr, "No file is chosen.");
-  const GridEntry& grid = RecentGrid(file.File.Absolute(), file.SelectedItem());
-  return GridMap(file, grid.data, grid.problem);
+  return GridMap(file, RecentGrid(file.File.Absolute(), file.SelectedItem(), slice));
 }
 
 MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit) {
@@ -128,11 +184,11 @@ MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit) {
     map.message = "No file is chosen.";
     return map;
   }
-  const ShapeEntry& shapes = RecentShapes(file.File.Absolute(), file.Attribute(), axisUnit);
-  if (shapes.data)
-    map.shapes.push_back({shapes.data, {}});
-  else
-    map.message = shapes.problem;
+  const auto shapes = RecentShapes(file.File.Absolute(), file.Attribute(), axisUnit);
+  if (auto data = NowOrAwaited(shapes, map.awaited))
+    map.shapes.push_back({std::move(data), {}});
+  else if (shapes->IsDone())
+    map.message = shapes->Problem();
   return map;
 }
 
@@ -144,36 +200,11 @@ SeriesContent FileChart(const DataFileNode& node) {
   }
   if (const auto* period = node.Important<CSimPeriodKvf>("SIMPERIOD"))
     chart.period = {period->GetSimStartDate(), period->SIMEND};
-  DataFile file;
-  chart.message = file.Open(node.File.Absolute());
-  if (!chart.message.empty()) return chart;
-  const int number = node.SelectedItem();
-  if (number < 1 || number > static_cast<int>(file.Items().size())) {
-    chart.message = fmt::format("there is no item {}: the file has {}", number, file.Items().size());
-    return chart;
-  }
-  const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)];
-  if (item.dimensions != 0 || !file.Time().hasDates) {
-    chart.message = "It is no time series.";
-    return chart;
-  }
-  if (file.Time().steps > kMostValues) {
-    chart.message = fmt::format("It has {} steps, too many to be shown.", file.Time().steps);
-    return chart;
-  }
-  std::vector<float> values(file.Time().steps);
-  chart.message = file.Read({number, 0, values.size(), {}}, values);
-  if (!chart.message.empty()) return chart;
-  Series series;
-  series.name = item.name;
-  series.unit = item.unitText;
-  series.isStepped = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
-  for (std::size_t step = 0; step < values.size(); ++step) {
-    series.times.push_back(file.Time().Stamp(step));
-    series.values.push_back(values[step] == kDeleteValue ? std::numeric_limits<double>::quiet_NaN()
-                                                         : static_cast<double>(values[step]));
-  }
-  chart.series.push_back(std::move(series));
+  const auto series = RecentSeries(node.File.Absolute(), node.SelectedItem());
+  if (const auto data = NowOrAwaited(series, chart.awaited))
+    chart.series.push_back(*data);
+  else if (series->IsDone())
+    chart.message = series->Problem();
   return chart;
 }
 

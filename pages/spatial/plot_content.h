@@ -9,6 +9,7 @@
 
 #include "pages/page.h"
 #include "pages/plots.h"
+#include "platform/grid_files.h"
 #include "spatial/file_nodes.h"
 #include "spatial/zone_sync.h"
 
@@ -17,8 +18,10 @@ namespace tervane {
 /// A map of one grid, or the reason why there is none; on the setup's backdrop and with its transparency.
 MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid,
                    const std::string& problem);
-/// The same of the first step of a data file's selected item.
-MapContent FileMap(const DataFileNode& file);
+/// The same of a grid that may still have to be computed; null for none.
+MapContent GridMap(const CYbSEKvfBase& node, const std::shared_ptr<ComputedGrid>& grid);
+/// The same of a data file's selected item, the first step and layer unless told.
+MapContent FileMap(const DataFileNode& file, const GridSlice& slice = {});
 /// A map of a shape file with its attribute.
 MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit);
 /// A chart of the selected item of a file of series, with the simulation's period.

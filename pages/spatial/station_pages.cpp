@@ -148,10 +148,7 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
         map.picked = [this](const MapPick& pick) {
           const CYbSEKvfBase* station = nullptr;
           if (Node().UsesGridCodes() && pick.value) station = Node().SelectStationByCode(static_cast<int>(*pick.value));
-          if (Node().UsesPolygons() && pick.shape) {
-            const auto shapes = ShapeFileMap(Node().Stations().ShapeFile(), Node().Stations().ShapeAxisUnit).shapes;
-            station = Node().SelectStationByName(TextOf(shapes.front().shapes->GetData()[*pick.shape].Value()));
-          }
+          if (Node().UsesPolygons() && pick.shape) station = Node().SelectStationByName(pick.shapeValue);
           if (station && Context().selectNode) Context().selectNode(*station);
         };
         return map;

@@ -82,8 +82,7 @@ void CSubcatchmentDlg::Describe(PageForm& form) {
         map.picked = [this](const MapPick& pick) {
           const CYbSEKvfBase* zone = nullptr;
           if (Node().UsesPolygons() && pick.shape) {
-            const auto shapes = ShapeFileMap(Node().ShapeFile(), Node().ShapeAxisUnit).shapes;
-            zone = Node().SelectZoneByName(TextOf(shapes.front().shapes->GetData()[*pick.shape].Value()));
+            zone = Node().SelectZoneByName(pick.shapeValue);
           } else if (pick.value) {
             zone = Node().SelectZoneByCode(static_cast<int>(*pick.value));
           }

@@ -117,8 +117,9 @@ TEST(Delaunay, IsExactAtTheEdgeOfTheLattice) {
 TEST(Delaunay, StopsWhenCancelled) {
   Points points;
   for (int i = 0; i < 5000; ++i) points.push_back({i, i * i % 97});
-  const std::atomic<bool> cancel = true;
-  EXPECT_TRUE(Triangulate(points, &cancel).empty());
+  Progress progress;
+  progress.Cancel();
+  EXPECT_THROW(Triangulate(points, progress), Cancelled);
 }
 
 }  // namespace

@@ -146,19 +146,42 @@ TEST(Interpolation, IsTheSameWithThreadsAndCanBeCancelled) {
   const std::vector<ScatteredPoint> points = RandomPoints(200);
   for (const InterpolationMethod method : {Bilinear, Triangular, InverseDistance, InverseDistanceSquared}) {
     InterpolationOptions options = Options(method, 20, 3);
-    double done = 0;
-    const std::thread::id caller = std::this_thread::get_id();
-    options.progress = [&](double fraction) {
-      EXPECT_GE(fraction, done);
-      EXPECT_EQ(std::this_thread::get_id(), caller);
-      done = fraction;
-    };
+    Progress progress;
+    options.progress = progress;
     EXPECT_EQ(Interpolated(points, kGrid, options), Interpolated(points, kGrid, Options(method, 20)));
-    EXPECT_EQ(done, 1);
-    const std::atomic<bool> cancel = true;
-    options.cancel = &cancel;
+    EXPECT_EQ(progress.Done(), 1);
+    progress.Cancel();
     std::vector<float> values;
-    EXPECT_THAT(Interpolate(points, kGrid, kEmpty, options, values).error, HasSubstr("cancelled"));
+    EXPECT_EQ(Interpolate(points, kGrid, kEmpty, options, values).error, kCancelled);
+    EXPECT_TRUE(values.empty());
+  }
+}
+
+TEST(Interpolation, EndsSoonAfterItIsCancelledAndItsProgressNeverFalls) {
+  // Every point reaches every cell: a single row would take longer than anybody wants to wait.
+  const std::vector<ScatteredPoint> points = RandomPoints(150'000);
+  const GridGeometry large{4000, 3000, 0.025, 1000, -500, 25, ""};
+  for (const InterpolationMethod method : {Bilinear, Triangular, InverseDistance}) {
+    SCOPED_TRACE(static_cast<int>(method));
+    InterpolationOptions options = Options(method, 100, 2);
+    Progress progress;
+    options.progress = progress;
+    std::vector<float> values;
+    std::string error;
+    std::thread work([&] { error = Interpolate(points, large, kEmpty, options, values).error; });
+    double before = 0;
+    for (int i = 0; i < 200; ++i) {
+      const double done = progress.Done();
+      EXPECT_GE(done, before);
+      before = done;
+      std::this_thread::sleep_for(std::chrono::microseconds(500));
+    }
+    progress.Cancel();
+    const auto cancelled = std::chrono::steady_clock::now();
+    work.join();
+    // A generous limit for a busy machine; undisturbed it is a few milliseconds.
+    EXPECT_LT(std::chrono::steady_clock::now() - cancelled, std::chrono::milliseconds(500));
+    EXPECT_EQ(error, kCancelled);
     EXPECT_TRUE(values.empty());
   }
 }
