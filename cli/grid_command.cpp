@@ -43,7 +43,8 @@ int ImportGridCommand(const GridImport& import, Streams streams) {
 
   CTvn2DOrthoRotatedGridData grid;
   const RasterImportReport report = ImportRaster(import.in, wanted, grid);
-  for (const std::string& note : report.notes) fmt::print(streams.err, "{}: {}\n", import.in, note);
+  for (const std::string& note : report.notes) fmt::print(streams.err, "{}: note: {}\n", import.in, note);
+  for (const std::string& warning : report.warnings) fmt::print(streams.err, "{}: warning: {}\n", import.in, warning);
   if (!report.Ok()) return Refuse(streams, report.error);
   const FileResult written = WriteGridData(import.out, grid);
   if (!written.Ok()) return Refuse(streams, written.error);

@@ -97,9 +97,9 @@ std::string Import::CompareProjections(std::unique_ptr<CYbProjectionChange>& cha
     return {};
   }
   if (isKnown(own) || isKnown(other)) {
-    report_.notes.push_back(fmt::format("warning: {} has no known projection, so that its coordinates are taken as {}",
-                                        isKnown(own) ? "the model grid" : "the raster",
-                                        isKnown(own) ? own.Name() : other.Name()));
+    report_.warnings.push_back(fmt::format("{} has no known projection, so that its coordinates are taken as {}",
+                                           isKnown(own) ? "the model grid" : "the raster",
+                                           isKnown(own) ? own.Name() : other.Name()));
   }
   return {};
 }

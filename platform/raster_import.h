@@ -25,7 +25,7 @@ struct RasterImport {
 /// What was done, for the user.
 struct RasterImportReport {
   std::string error;
-  std::vector<std::string> notes;
+  std::vector<std::string> notes, warnings;
   Resampling resampling = Resampling::CellForCell;
   std::size_t values = 0, empty = 0;
 
