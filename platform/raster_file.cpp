@@ -142,6 +142,7 @@ std::string RasterFile::Open(const std::string& path) {
   if (!state->raster) {
     // The file was named already.
     reason = Trimmed(Replaced(reason, AbsoluteFromHere(path) + ":", ""));
+    if (reason.empty() && isClassicNetcdf) reason = "it holds no grid that can be read as a raster";
     return refused(reason.empty() ? "it is neither a data file nor a raster of a kind that is known here" : reason);
   }
   if (stored.bands.empty()) {
