@@ -171,6 +171,9 @@ class CYbSEKvfBase {
   /// Reset hook of list items.
   virtual void SetDefault() {}
 
+  /// False for a node that shows what others wrote: undo passes over it and all below it.
+  virtual bool IsKnownToUndo() const { return true; }
+
  protected:
   /// The keys of the node in the order of the file.
   virtual void ExchangeKeys(KeyExchange& /*keys*/) {}
