@@ -60,9 +60,7 @@ class CProcDataKvf : public CYbSEKvfBase {
   const PageClass* GetDlgRuntimeClass(int treeId) const override {
     return treeId == kProcessedDataTree ? &kProcDataPage : nullptr;
   }
-  /// Nothing below has anything to validate.
-  int Validate() override { return 1; }
-  bool IsKnownToUndo() const override { return false; }
+  bool HoldsSetup() const override { return false; }
   int AddToOverview(std::vector<OverviewLine>& /*lines*/, int /*level*/) override { return 1; }
 
  private:

@@ -174,8 +174,8 @@ std::string RiverBytes::Bytes() const {
   put(version);
   put(nx);
   put(ny);
-  put(points < 0 ? static_cast<int>(river.size()) : points);
-  put(projectionLength < 0 ? static_cast<int>(projection.size()) + 1 : projectionLength);
+  put(points.value_or(static_cast<int>(river.size())));
+  put(projectionLength.value_or(static_cast<int>(projection.size()) + 1));
   bytes.append(projection.c_str(), projection.size() + 1);
   for (const double number : {cellSize, x0, y0, rotation}) put(number);
   put(-1e-35F);

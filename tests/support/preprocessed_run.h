@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -13,7 +14,8 @@ void WritePreprocessedRun(const std::string& resultFolder, const std::string& ba
 
 /// A river file in memory, whose parts a test may make wrong.
 struct RiverBytes {
-  int version = 1, nx = 4, ny = 3, points = -1, projectionLength = -1;  ///< Points and length -1: as many as there are.
+  int version = 1, nx = 4, ny = 3;
+  std::optional<int> points, projectionLength;  ///< As many as there are when nothing is said.
   std::string projection = {};
   double cellSize = 100, x0 = 0, y0 = 0, rotation = 0;
   std::vector<int> first, second;  ///< nx * ny values each.
