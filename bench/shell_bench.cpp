@@ -13,6 +13,7 @@
 #include <QTemporaryDir>
 #include <algorithm>
 #include <cstdlib>
+#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -128,6 +129,38 @@ void MeasureChanges(MainWindow& window, const std::string& setup, double limit) 
        30, "ms");
 }
 
+// ---- Processed data
+
+/// A report as preprocessors write them: groups of ten pages, grids with few keys.
+std::string ReportWithPages(int count) {
+  std::string text = "target PreProcessed_Data {\nsection PAGE {\nTITLE = \"Preprocessed data\"\n";
+  for (int page = 1; page < count; ++page) {
+    if (page % 10 == 1) text += fmt::format("section PAGE {{\nTITLE = \"Group {}\"\nsection BLANK {{\n}}\n", page / 10);
+    if (page % 10 != 1)
+      text += fmt::format(
+          "section PAGE {{\nTITLE = \"Quantity {}\"\nAbbrev = \"Q{}\"\nsection NDS2_PLOT {{\nFilename = file "
+          "\"maps_{}.nds2\"\nItemNo = {}\n}}\n}}\n",
+          page, page, page, page % 7 + 1);
+    if (page % 10 == 0 || page == count - 1) text += "}\n";
+  }
+  return text + "}\n}\n";
+}
+
+void MeasureProcessedData(MainWindow& window, int pages, double limit) {
+  DocumentFrame& frame = *window.Frame();
+  const CPreprocessedDataManager& manager = *frame.Session().Document().AttachPreprocessorReport();
+  std::filesystem::create_directories(std::filesystem::path(manager.Path()).parent_path());
+  WriteFileAtomically(manager.Path(), ReportWithPages(pages));
+  frame.RebuildProcessedData();
+  frame.GoToPath("ProcData/Preprocessed data/Group 0/Quantity 2");
+  Settle(window);
+  Tell(fmt::format("rebuild {} pages of processed data until they are drawn", manager.PageCount()), MedianOf([&] {
+         frame.RebuildProcessedData();
+         Settle(window);
+       }),
+       limit, "ms");
+}
+
 void Measure(const QString& self) {
   const QTemporaryDir folder;
   Program program(folder.filePath("settings.ini"));
@@ -150,6 +183,10 @@ void Measure(const QString& self) {
     Tell("resident memory with one default setup", static_cast<double>(os::ResidentMemory()) / (1 << 20), 120, "MB");
     MeasurePages(window);
     MeasureChanges(window, "default setup", 16);
+    MeasureProcessedData(window, 1000, 200);
+    MeasureChanges(window, "1,000 processed pages", 16);
+    MeasureProcessedData(window, 100'000, 5000);
+    std::filesystem::remove_all(std::filesystem::path(FromQt(few)).replace_extension() += "_results");
   }
   MainWindow window(program);
   window.resize(1280, 800);

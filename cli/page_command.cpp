@@ -15,6 +15,7 @@ int PageCommand(const std::string& file, const std::string& typed, Streams strea
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   TellThatThereIsAReport(document, streams);
+  ReadProcessedData(document, streams);
   CYbSEKvfBase* node = FindNodeOrTell(document, ParseSetupPath(typed), typed, streams);
   if (!node) return kCouldNot;
   const PageClass* pageClass = PageClassOf(*node);

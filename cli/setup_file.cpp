@@ -45,6 +45,13 @@ void TellThatThereIsAReport(const CFlowModelDoc& document, Streams streams) {
              document.PathName(), report.entries.size(), report.unread.size());
 }
 
+void ReadProcessedData(const CFlowModelDoc& document, Streams streams) {
+  CPreprocessedDataManager* report = document.AttachPreprocessorReport();
+  if (!report) return;
+  report->Load();
+  if (!report->Problem().empty()) fmt::print(streams.err, "{}\n", report->Problem());
+}
+
 namespace {
 
 /// ", did you mean X?" for the name that comes nearest, or nothing.

@@ -20,6 +20,10 @@ void TellReport(const CFlowModelDoc& document, Streams streams);
 /// The same in one line, for commands that only show something.
 void TellThatThereIsAReport(const CFlowModelDoc& document, Streams streams);
 
+/// Reads what the preprocessor left of the setup, for commands that show places; tells why where there is a report that
+/// cannot be read.
+void ReadProcessedData(const CFlowModelDoc& document, Streams streams);
+
 /// A place as a person types it, found in a tree; null, with a message that names what comes near, when it is not
 /// there.
 CYbSEKvfBase* FindNodeOrTell(CFlowModelDoc& document, const SetupPath& path, const std::string& typed, Streams streams);

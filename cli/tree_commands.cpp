@@ -17,6 +17,7 @@ int TreeCommand(const std::string& file, bool all, TreeForm form, Streams stream
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   TellThatThereIsAReport(document, streams);
+  ReadProcessedData(document, streams);
   std::vector<std::string> json;
   WalkNodes(document.Root(), [&](const NodePlace& place) {
     if (!all && !place.takesPart) return;

@@ -228,6 +228,7 @@ int CYbSEKvfBase::IsDataUsedInSetup() {
 int CYbSEKvfBase::Validate() {
   findings_.clear();
   valid_ = 1;
+  if (!HoldsSetup()) return valid_;
   if (IsDataUsedInSetup()) {
     valid_ = ValidateData() != 0 && std::none_of(findings_.begin(), findings_.end(), [](const Finding& finding) {
                return finding.severity == Severity::Error;

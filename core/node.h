@@ -171,6 +171,10 @@ class CYbSEKvfBase {
   /// Reset hook of list items.
   virtual void SetDefault() {}
 
+  /// False for a node that shows what others wrote: nothing at or below it is the setup's, so that undo, validation and
+  /// findings pass over it. There may be very many such nodes.
+  virtual bool HoldsSetup() const { return true; }
+
  protected:
   /// The keys of the node in the order of the file.
   virtual void ExchangeKeys(KeyExchange& /*keys*/) {}

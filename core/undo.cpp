@@ -38,6 +38,7 @@ void UndoStack::Restore(CYbSEKvfBase& node, const State& state) {
 }
 
 void UndoStack::Capture(CYbSEKvfBase& node, const std::shared_ptr<CYbSEKvfBase>& owner, std::vector<Change>& changes) {
+  if (!node.HoldsSetup()) return;
   State state = StateOf(node);
   const auto [known, isNew] = shadow_.try_emplace(&node);
   Shadow& shadow = known->second;

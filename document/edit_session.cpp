@@ -123,6 +123,10 @@ void EditSession::Begin() { undo_ = std::make_unique<UndoStack>(document_->Root(
 // ---- Changes
 
 void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& action, const void* source) {
+  if (hint == 0) {
+    if (listener_) listener_(hint);
+    return;
+  }
   ++changes_;
   // What undo does not know of, such as the custom result folder, counts as a change all the same.
   if (!undo_->Commit(action, source)) document_->SetModified(true);

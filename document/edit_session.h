@@ -48,7 +48,7 @@ class EditSession {
 
   void Listen(Listener listener) { listener_ = std::move(listener); }
   /// Takes what a user did as one step to undo, validates `node` and what is below it (or all, where that was asked
-  /// for), and tells the listener.
+  /// for), and tells the listener. Hint 0 tells the listener and does nothing else: the document is as it was.
   void UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& action, const void* source = nullptr);
   bool Undo();
   bool Redo();

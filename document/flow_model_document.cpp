@@ -15,6 +15,13 @@ std::string CFlowModelDoc::ResultFile(std::string_view stemEnd, std::string_view
   return ResultFileName(getResultFolder(), std::string(BaseNameOf(PathName())) + std::string(stemEnd), extension);
 }
 
+CPreprocessedDataManager* CFlowModelDoc::AttachPreprocessorReport() const {
+  auto* processed = Root().Important<CProcDataKvf>("PROCESSED_DATA");
+  if (!processed || PathName().empty()) return nullptr;
+  processed->SetPath(ResolvedPath(PreprocessorReport(), {}));
+  return processed->Manager();
+}
+
 std::string ResultFileName(std::string_view folder, std::string_view stem, std::string_view extension) {
   std::string name = Replaced(Trimmed(folder), "/", "\\");
   if (name.empty() || name.back() != '\\') name += '\\';

@@ -7,6 +7,7 @@
 
 #include "core/document.h"
 #include "document/global.h"
+#include "execution/processed_data.h"
 
 namespace tervane {
 
@@ -27,6 +28,10 @@ class CFlowModelDoc : public CYbSEDocument {
   std::string GridSeriesIndex() const { return ResultFile("", ".fif"); }
   std::string DetailedTimeSeriesPage() const { return ResultFile("DetailedTS", ".HTML"); }
   std::string DetailedRiverTimeSeriesPage() const { return ResultFile("DetailedFvrTS", ".HTML"); }
+
+  /// Tells the node of the processed data where the preprocessor's report is now, and gives its manager. Null for a
+  /// setup that was never saved, beside which nothing can lie.
+  CPreprocessedDataManager* AttachPreprocessorReport() const;
 
  protected:
   void OnLoaded() override;

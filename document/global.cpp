@@ -12,6 +12,7 @@
 #include "document/view_settings.h"
 #include "exchange/overlays.h"
 #include "execution/execute_flags.h"
+#include "execution/processed_data.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/extra_params.h"
 #include "simspec/introduction.h"
@@ -52,6 +53,7 @@ constexpr std::array kChildren{
     ChildRow{Make<CDummySatZoneKvf>, ""},
     ChildRow{Make<CExtraParamsKvf>, ""},
     ChildRow{Make<CExecuteEngineFlagsKvf>, "EXECUTE_ENGINE_FLAGS"},
+    ChildRow{Make<CProcDataKvf>, "PROCESSED_DATA"},
     ChildRow{Make<COverviewKvf>, "OVERVIEW"},
 };
 

@@ -23,6 +23,19 @@ std::uint64_t NearestSerial(const SerialsByPath& serials, const std::string& typ
   return nearest;
 }
 
+/// The findings of all nodes below, in the order of the walk. A path is made for a node that has some alone.
+void AddFindings(const CYbSEKvfBase& node, std::vector<SetupFinding>& found) {
+  using Kind = SetupFinding::Kind;
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
+    if (!child->HoldsSetup()) continue;
+    const std::string path = child->Findings().empty() ? std::string() : PathOf(*child);
+    for (const Finding& finding : child->Findings())
+      found.push_back({finding.severity == Severity::Error ? Kind::Error : Kind::Warning, path, finding.text,
+                       finding.key, finding.detail, 0, child->Serial()});
+    AddFindings(*child, found);
+  }
+}
+
 }  // namespace
 
 std::string_view KindName(SetupFinding::Kind kind) {
@@ -43,13 +56,10 @@ std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document) {
   using Kind = SetupFinding::Kind;
   const LoadReport& report = document.Report();
   SerialsByPath serials;
+  if (!report.IsEmpty())
+    WalkNodes(document.Root(), [&](const NodePlace& place) { serials.emplace(place.path, place.node.Serial()); });
   std::vector<SetupFinding> ofNodes;
-  WalkNodes(document.Root(), [&](const NodePlace& place) {
-    if (!report.IsEmpty()) serials.emplace(place.path, place.node.Serial());
-    for (const Finding& finding : place.node.Findings())
-      ofNodes.push_back({finding.severity == Severity::Error ? Kind::Error : Kind::Warning, place.path, finding.text,
-                         finding.key, finding.detail, 0, place.node.Serial()});
-  });
+  AddFindings(document.Root(), ofNodes);
   std::vector<SetupFinding> found;
   for (const LoadReport::Entry& entry : report.entries)
     found.push_back({entry.kind == LoadReport::Kind::Warning ? Kind::Warning : Kind::Note,

@@ -30,6 +30,8 @@ struct PageContext {
   /// the user gave up.
   std::function<bool(const std::string& title, CYbSEDlgBase& form, const std::function<std::string()>& accept)>
       runDialog = {};
+  /// The page takes the place of one that the user had before him: what that one told is not told again.
+  bool isReplacement = false;
   /// The user's units; null for base units. They outlive the page.
   const DisplayUnits* displayUnits = nullptr;
 };

@@ -16,9 +16,9 @@
 namespace tervane {
 
 std::string_view KindName(ControlKind kind) {
-  constexpr std::array<std::string_view, 19> names{
-      "check",  "radio", "choice", "text", "long text", "integer", "number", "date",  "file",    "label",
-      "button", "table", "shown",  "view", "browser",   "map",     "chart",  "group", "sub-form"};
+  constexpr std::array<std::string_view, 21> names{
+      "check", "radio", "choice", "text", "long text", "integer", "number", "date",  "file",  "label",   "button",
+      "table", "shown", "notice", "view", "text file", "browser", "map",    "chart", "group", "sub-form"};
   return names[static_cast<std::size_t>(kind)];
 }
 
@@ -124,6 +124,12 @@ Control& PageForm::Text(std::string label, std::function<std::string()> get,
   return control;
 }
 
+Control& PageForm::ReadOnlyText(std::string label, std::function<std::string()> get) {
+  Control& control = Add(ControlKind::Text, std::move(label));
+  control.text = std::move(get);
+  return control;
+}
+
 Control& PageForm::LongText(std::string label, std::string& value) {
   Control& control = Text(std::move(label), value);
   control.kind = ControlKind::LongText;
@@ -207,6 +213,18 @@ Control& PageForm::Choice(std::string label, std::function<int()> get, std::func
 Control& PageForm::Shown(std::string label, std::function<std::string()> text) {
   Control& control = Add(ControlKind::Shown, std::move(label));
   control.text = std::move(text);
+  return control;
+}
+
+Control& PageForm::Notice(std::function<std::string()> text) {
+  Control& control = Add(ControlKind::Notice, {});
+  control.text = std::move(text);
+  return control;
+}
+
+Control& PageForm::TextFile(std::function<std::string()> path) {
+  Control& control = Add(ControlKind::TextFile, {});
+  control.text = std::move(path);
   return control;
 }
 

@@ -28,6 +28,7 @@ struct SeriesContent;
 
 /// Bits of a change that views are told of.
 enum UpdateHint : int {
+  kViewOnly = 0,  ///< Only what is shown is another: the document is as it was.
   kDataChanged = 1,
   kItemAdded = 2,
   kItemDeleted = 4,
@@ -50,8 +51,10 @@ enum class ControlKind {
   Button,
   Table,
   Shown,     ///< A value that is only shown.
+  Notice,    ///< A sentence or two that are only read; no place is taken while there is nothing to say.
   TextView,  ///< A text that is only read.
-  Browser,   ///< A help page.
+  TextFile,  ///< The text of a file, which is read as far as the user looks.
+  Browser,   ///< A page in HTML.
   Map,       ///< Grids, shapes and points from above.
   Chart,     ///< Curves over time.
   Group,     ///< A frame with a title around further controls.
@@ -64,6 +67,7 @@ class Control {
  public:
   ControlKind kind = ControlKind::Label;
   std::string label;
+  std::string toolTip;
   std::string unit;                                   ///< A fixed unit; `UnitText` tells what is shown.
   int itemType = 0;                                   ///< The number is a quantity of that item type; 0 for none.
   const DisplayUnits* displayUnits = nullptr;         ///< The user's units; null for base units.
@@ -71,6 +75,7 @@ class Control {
   std::string key;                                    ///< Of the node, so that a finding leads here.
   const CYbSEKvfBase* node = nullptr;
   Host::FileQuestion fileQuestion;    ///< Of a file name.
+  std::string folder;                 ///< Of a page of a browser: where what it names lies.
   std::function<std::string()> text;  ///< The value as shown; of a check "1" or "0", of options the number from 0.
   /// Takes a typed value; gives what was expected when it is none, and then changes nothing.
   std::function<std::string(const std::string&)> enter;
@@ -112,6 +117,8 @@ class Control {
   Control& Quantity(int itemType_) { return itemType = itemType_, *this; }
   Control& Beside() { return beside = true, *this; }
   Control& Key(std::string name) { return key = std::move(name), *this; }
+  Control& Folder(std::string path) { return folder = std::move(path), *this; }
+  Control& ToolTip(std::string text_) { return toolTip = std::move(text_), *this; }
   Control& Revalidates() { return revalidates = true, *this; }
   Control& RevalidatesLater() { return revalidatesLater = true, *this; }
   Control& Hint(int hint_) { return hint = hint_, *this; }
@@ -140,6 +147,8 @@ class PageForm {
                   std::function<std::vector<std::string>()> options);
   Control& Text(std::string label, std::string& value);
   Control& Text(std::string label, std::function<std::string()> get, std::function<void(const std::string&)> set);
+  /// A text to read, select and copy in its field, with its end in view: the name of a file.
+  Control& ReadOnlyText(std::string label, std::function<std::string()> get);
   Control& LongText(std::string label, std::string& value);
   Control& Integer(std::string label, int& value);
   Control& Integer(std::string label, std::function<int()> get, std::function<void(int)> set);
@@ -156,7 +165,10 @@ class PageForm {
   Control& ShapeFile(std::string label, CData2DShpFile& file);
   Control& Label(std::string text);
   Control& Button(std::string label, std::function<void()> press);
+  Control& Notice(std::function<std::string()> text);
   Control& TextView(std::string label, std::function<std::string()> text);
+  /// The text of the file at a path.
+  Control& TextFile(std::function<std::string()> path);
   Control& Browser(std::function<std::string()> page);
   /// A value that is only shown.
   Control& Shown(std::string label, std::function<std::string()> text);

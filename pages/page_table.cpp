@@ -6,7 +6,9 @@
 #include "document/pages.h"
 #include "exchange/overlays.h"
 #include "exchange/pages.h"
+#include "execution/pages.h"
 #include "pages/document/document_pages.h"
+#include "pages/execution/processed_pages.h"
 #include "pages/page.h"
 #include "pages/simspec/components_pages.h"
 #include "pages/simspec/control_pages.h"
@@ -74,6 +76,15 @@ const std::array kPages{
     PageRow{kControlOLPage, Make<CCompControlParaOLDlg, CCompControlParaOLKvf>},
     PageRow{kControlUZPage, Make<CCompControlParaUZDlg, CCompControlParaUZKvf>},
     PageRow{kControlSZPage, Make<CCompControlParaSZDlg, CCompControlParaSZKvf>},
+    PageRow{kProcDataPage, Make<CProcDataDlg, CProcDataKvf>},
+    PageRow{kPreprocessedBlankPage, Make<CPreprocessedBlankDlg, CPreprocessedDataEntity>},
+    PageRow{kPreprocessedNds0Page, Make<CPreprocessedNDS0_PLOTDlg, CPreprocessedDataEntity>},
+    PageRow{kPreprocessedNds1Page, Make<CPreProcessedNDS1_PLOTDlg, CPreprocessedDataEntity>},
+    PageRow{kPreprocessedNds2Page, Make<CPreprocessedNDS2_PLOT, CPreprocessedDataEntity>},
+    PageRow{kPreprocessedNds3Page, Make<CPreprocessedNDS3_PLOTDlg, CPreprocessedDataEntity>},
+    PageRow{kPreprocessedTextPage, Make<CPreprocessedTextDlg, CPreprocessedDataEntity>},
+    PageRow{kPreprocessedTextFilePage, Make<CPreprocessedTXTFILEDlg, CPreprocessedDataEntity>},
+    PageRow{kPreprocessedShapePage, Make<CPreprocessedSHAPE_PLOTDlg, CPreprocessedDataEntity>},
 };
 
 std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, PageContext context) {

@@ -31,7 +31,9 @@ struct GridLayer {
 /// Shapes over a grid.
 struct ShapeLayer {
   std::shared_ptr<const CYbShapeData> shapes;
-  std::string highlighted = {};  ///< Shapes whose value reads so stand out; empty for none.
+  std::string highlighted = {};            ///< Shapes whose value reads so stand out; empty for none.
+  std::optional<unsigned> lineColor = {};  ///< Red, green, blue; the colour of the theme when nothing is said.
+  std::optional<double> lineWidth = {};    ///< In pixels.
 
   bool operator==(const ShapeLayer&) const = default;
 };

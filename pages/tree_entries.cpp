@@ -33,6 +33,8 @@ void AddEntriesBelow(Place& place, int treeId, int depth, std::vector<TreeEntry>
   for (CYbSEKvfBase* child = place.Node().GetFirstChild(); child; child = place.Node().GetNextChild(child)) {
     const PageClass* page = child->GetDlgRuntimeClass(treeId);
     if ((!page && !child->GetFirstChild()) || !child->IsDlgUsedInSetup()) continue;
+    // What others wrote stands in one tree alone.
+    if (!page && !child->HoldsSetup()) continue;
     Place below(*child, &place);
     if (page) {
       const std::string& path = below.Path();

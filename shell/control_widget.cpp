@@ -32,6 +32,7 @@
 #include "shell/qt_text.h"
 #include "shell/series_plot.h"
 #include "shell/table_view.h"
+#include "shell/text_file_view.h"
 #include "shell/theme.h"
 
 namespace tervane {
@@ -217,6 +218,7 @@ class LineWidget : public ControlWidget {
     MakeLabel();
     edit_ = new QLineEdit;
     edit_->installEventFilter(this);
+    edit_->setReadOnly(!control.enter);
     auto* row = MakeField(edit_, Width() == kTextWidth);
     if (Width() != kTextWidth)
       edit_->setFixedWidth(Theme::Get().Scaled(Width()));
@@ -247,9 +249,9 @@ class LineWidget : public ControlWidget {
     if (edited_ || IsRefused()) return;
     if (const QString text = ToQt(Described().Text()); text != edit_->text()) {
       edit_->setText(text);
-      edit_->setCursorPosition(0);
+      edit_->setCursorPosition(edit_->isReadOnly() ? static_cast<int>(text.size()) : 0);
     }
-    if (Described().kind == ControlKind::File) edit_->setToolTip(ToQt(Described().Text()));
+    if (Described().kind == ControlKind::File || edit_->isReadOnly()) edit_->setToolTip(ToQt(Described().Text()));
   }
   void ShowRefused(bool refused) override {
     QPalette palette;
@@ -419,6 +421,30 @@ class ShownWidget : public ControlWidget {
   QLabel* value_;
 };
 
+class NoticeWidget : public ControlWidget {
+ public:
+  NoticeWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    text_ = new QLabel;
+    text_->setWordWrap(true);
+    text_->setTextFormat(Qt::PlainText);
+    auto* copy = new QAction(tr("&Copy"), text_);
+    connect(copy, &QAction::triggered, this, [this] { QApplication::clipboard()->setText(ToQt(Described().Text())); });
+    text_->addAction(copy);
+    text_->setContextMenuPolicy(Qt::ActionsContextMenu);
+    MakeField(text_, true);
+  }
+
+ protected:
+  void SyncValue() override {
+    // A path has no place to break but behind its separators.
+    text_->setText(Translated(Described().Text()).replace("/", QString("/") + QChar(0x200b)));
+    Field()->setVisible(Described().IsShown() && !text_->text().isEmpty());
+  }
+
+ private:
+  QLabel* text_;
+};
+
 class LabelWidget : public ControlWidget {
  public:
   LabelWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
@@ -472,6 +498,23 @@ class TextViewWidget : public ControlWidget {
   QPlainTextEdit* view_;
 };
 
+class TextFileWidget : public ControlWidget {
+ public:
+  TextFileWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    view_ = new TextFileView;
+    MakeField(view_, true);
+  }
+  bool GrowsDown() const override { return true; }
+  bool GrowsRight() const override { return true; }
+  QWidget* FocusTarget() const override { return &view_->Text(); }
+
+ protected:
+  void SyncValue() override { view_->Show(Described().Text()); }
+
+ private:
+  TextFileView* view_;
+};
+
 class BrowserWidget : public ControlWidget {
  public:
   BrowserWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
@@ -482,7 +525,7 @@ class BrowserWidget : public ControlWidget {
       if (const std::string_view* linked = FindHelpPage(FromQt(link.toString())))
         view_->setHtml(ToQt(*linked));
       else
-        QDesktopServices::openUrl(link);
+        QDesktopServices::openUrl(QUrl::fromLocalFile(ToQt(Described().folder) + "/").resolved(link));
     });
   }
   bool GrowsDown() const override { return true; }
@@ -491,7 +534,10 @@ class BrowserWidget : public ControlWidget {
 
  protected:
   void SyncValue() override {
-    if (const QString text = ToQt(Described().Text()); text != shown_) view_->setHtml(shown_ = text);
+    if (const QString text = ToQt(Described().Text()); text != shown_) {
+      view_->setSearchPaths({ToQt(Described().folder)});
+      view_->setHtml(shown_ = text);
+    }
   }
 
  private:
@@ -585,6 +631,8 @@ std::unique_ptr<ControlWidget> ControlWidget::Make(CYbSEDlgBase& page, Control& 
       return std::make_unique<LongTextWidget>(page, control);
     case ControlKind::Shown:
       return std::make_unique<ShownWidget>(page, control);
+    case ControlKind::Notice:
+      return std::make_unique<NoticeWidget>(page, control);
     case ControlKind::Label:
       return std::make_unique<LabelWidget>(page, control);
     case ControlKind::Button:
@@ -593,6 +641,8 @@ std::unique_ptr<ControlWidget> ControlWidget::Make(CYbSEDlgBase& page, Control& 
       return std::make_unique<TableWidget>(page, control);
     case ControlKind::TextView:
       return std::make_unique<TextViewWidget>(page, control);
+    case ControlKind::TextFile:
+      return std::make_unique<TextFileWidget>(page, control);
     case ControlKind::Browser:
       return std::make_unique<BrowserWidget>(page, control);
     case ControlKind::Map:
@@ -640,6 +690,7 @@ QBoxLayout* ControlWidget::MakeField(QWidget* editor, bool grows) {
   message_->hide();
   column->addWidget(message_);
   if (auto* label = qobject_cast<QLabel*>(label_)) label->setBuddy(FocusTarget() ? FocusTarget() : editor);
+  if (!control_.toolTip.empty()) editor->setToolTip(Translated(control_.toolTip));
   if (QWidget* target = editor; target->accessibleName().isEmpty() && !control_.label.empty())
     target->setAccessibleName(Translated(control_.label));
   return row;

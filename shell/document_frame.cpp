@@ -33,8 +33,9 @@ namespace tervane {
 namespace {
 
 constexpr int kTreeWidth = 250, kPageWidth = 750, kPageHeight = 480, kBottomHeight = 110;
-constexpr int kAutosaveDelay = 2000;  ///< Milliseconds after the last change.
-constexpr int kDiskInterval = 3000;   ///< Milliseconds between looks at the file on disk.
+constexpr int kAutosaveDelay = 2000;      ///< Milliseconds after the last change.
+constexpr int kDiskInterval = 3000;       ///< Milliseconds between looks at the file on disk.
+constexpr int kProcessedInterval = 1000;  ///< The same at the preprocessor's report.
 constexpr std::size_t kMostVisited = 200;
 
 CYbSEKvfBase* NodeBelow(CYbSEKvfBase& node, std::uint64_t serial) {
@@ -57,7 +58,11 @@ DocumentFrame::DocumentFrame(std::unique_ptr<EditSession> session, const QString
   connect(&autosave_, &QTimer::timeout, this, &DocumentFrame::RunAutosave);
   connect(&disk_, &QTimer::timeout, this, &DocumentFrame::CheckDisk);
   disk_.start(kDiskInterval);
+  connect(&processed_, &QTimer::timeout, this, &DocumentFrame::CheckProcessedData);
+  processed_.start(kProcessedInterval);
 
+  if (CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport()) report->Load();
+  TellProcessedData();
   Refresh(kDataChanged);
   if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));
   if (session_->IsReadOnly())
@@ -184,6 +189,7 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
                         session_->UpdateDoc(node, hint, action, source);
                       }};
   context.displayUnits = &program_.Units();
+  context.isReplacement = isRebuilding_;
   context.openDataFile = [this](const std::string& path) { emit DataFileWanted(ToQt(path)); };
   context.selectNode = [this](const CYbSEKvfBase& other) {
     QTimer::singleShot(0, this, [this, serial = other.Serial()] { GoTo(serial); });
@@ -206,6 +212,7 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
   });
   pagePlace_->layout()->addWidget(page_);
   current_ = node.Serial();
+  if (!isRebuilding_) lostPage_.clear();
   above_.clear();
   for (const CYbSEKvfBase* parent = node.GetParent(); parent; parent = parent->GetParent())
     above_.push_back(parent->Serial());
@@ -278,6 +285,53 @@ void DocumentFrame::FocusNextPane() {
     bottomTabs_->currentWidget()->setFocus();
   else
     treeTabs_->currentWidget()->setFocus();
+}
+
+// ---- Processed data
+
+void DocumentFrame::RebuildProcessedData() {
+  CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
+  if (!report) return;
+  auto* processed = session_->Document().Root().Important<CProcDataKvf>("PROCESSED_DATA");
+  const CYbSEKvfBase* shown = NodeOf(current_);
+  const bool isShown = shown == processed || (shown && NodeBelow(*processed, current_));
+  std::string place;
+  if (isShown) {
+    place = shown == processed && !lostPage_.empty() ? lostPage_ : PathOf(*shown);
+    // Pages speak of nodes: this one goes before its node does.
+    delete page_;
+    current_ = 0;
+  }
+  report->Load();
+  TellProcessedData();
+  Refresh(kItemDeleted | kItemAdded | kTreeRebuilt | kRefreshPlots | kDataChanged);
+  if (!isShown) return;
+  isRebuilding_ = isGoing_ = true;
+  const bool isThere = GoToPath(place);
+  lostPage_ = isThere ? std::string() : place;
+  if (!isThere) GoTo(processed->Serial());
+  if (place_ >= 0) visited_[static_cast<std::size_t>(place_)] = current_;
+  isRebuilding_ = isGoing_ = false;
+}
+
+void DocumentFrame::CheckProcessedData() {
+  // The pages of an open dialog or menu may be those that would be taken away.
+  if (QApplication::activeModalWidget() || QApplication::activePopupWidget()) return;
+  const CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
+  if (!report) return;
+  using OnDisk = CPreprocessedDataManager::OnDisk;
+  const OnDisk state = report->CheckDisk();
+  if (state == OnDisk::Changed) return RebuildProcessedData();
+  if (isReportGone_ == (state == OnDisk::Gone)) return;
+  isReportGone_ = state == OnDisk::Gone;
+  if (page_) page_->Sync();
+}
+
+void DocumentFrame::TellProcessedData() {
+  const CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
+  const std::string problem = report ? report->Problem() : std::string();
+  if (problem != toldProblem_ && !problem.empty()) Log(tr("Processed data: %1").arg(ToQt(problem)));
+  toldProblem_ = problem;
 }
 
 // ---- Editing

@@ -64,6 +64,9 @@ class DocumentFrame : public QWidget {
   void Commit();
   /// Looks at the files of the shown page again, and draws all anew.
   void RefreshPlots();
+  /// Reads the preprocessor's report again and shows its pages anew; the page that is shown stays where the report
+  /// still has it. To be called when a run has ended; a timer calls it when the report has changed on disk.
+  void RebuildProcessedData();
   void Undo();
   void Redo();
   /// A change that a menu makes in a node that has no page.
@@ -93,6 +96,9 @@ class DocumentFrame : public QWidget {
   void BuildBody();
   void Refresh(int hint);
   void ShowPage(CYbSEKvfBase& node, const std::string& control);
+  /// Looks whether the preprocessor's report is another one.
+  void CheckProcessedData();
+  void TellProcessedData();
   void Remember(std::uint64_t serial);
   /// Selects the node's entry, preferably in the tree that is shown; false when no tree has one.
   bool SelectInTrees(std::uint64_t serial);
@@ -126,7 +132,11 @@ class DocumentFrame : public QWidget {
   std::vector<std::uint64_t> visited_;  ///< For going back and forward.
   std::ptrdiff_t place_ = -1;           ///< Of the shown node in `visited_`.
   bool isGoing_ = false;
-  QTimer autosave_, disk_;
+  bool isRebuilding_ = false;
+  std::string lostPage_;  ///< The path of a page of processed data that a rebuild took away, until another is chosen.
+  std::string toldProblem_;  ///< Of the report, as the log has it.
+  bool isReportGone_ = false;
+  QTimer autosave_, disk_, processed_;
 };
 
 }  // namespace tervane

@@ -292,7 +292,10 @@ void ShapePicture::Draw(QPainter& painter, const MapWindow& window, bool onDark,
       filled.addPolygon(ring);
     }
   }
-  const QColor ink = isRing ? InkColor(onDark) : onDark ? QColor(0x7c, 0xc4, 0xff) : QColor(0x14, 0x5a, 0xa8);
+  const QColor ink = layer_.lineColor ? QColor::fromRgb(*layer_.lineColor)
+                     : isRing         ? InkColor(onDark)
+                     : onDark         ? QColor(0x7c, 0xc4, 0xff)
+                                      : QColor(0x14, 0x5a, 0xa8);
   const auto draw = [&](const std::vector<QPolygonF>& drawn, const QColor& color, double width) {
     // Outlines of one layer share their edge, so that none lies over another's line.
     for (const QPen& pen : {QPen(EdgeColor(onDark), (width + 2.2) * zoom, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin),
@@ -302,7 +305,7 @@ void ShapePicture::Draw(QPainter& painter, const MapWindow& window, bool onDark,
     }
   };
   painter.setBrush(Qt::NoBrush);
-  draw(lines, ink, isRing ? 1.1 : 1.6);
+  draw(lines, ink, layer_.lineWidth.value_or(isRing ? 1.1 : 1.6));
   if (highlighted.empty()) return;
   QColor veil = kHighlightColor;
   veil.setAlpha(50);

@@ -62,9 +62,15 @@ void NodeTree::Sync(CYbSEKvfGlobalBase& root, bool showMarks) {
   }
   if (entries != entries_) {
     const QSignalBlocker blocker(this);
-    std::set<quint64> closed;
-    for (const QTreeWidgetItem* item : items_)
-      if (item->childCount() > 0 && !item->isExpanded()) closed.insert(item->data(0, kSerialRole).toULongLong());
+    // Nodes that were made anew are known by their paths.
+    std::set<quint64> closed, known;
+    std::set<QString> closedPaths;
+    for (const QTreeWidgetItem* item : items_) {
+      known.insert(item->data(0, kSerialRole).toULongLong());
+      if (item->childCount() == 0 || item->isExpanded()) continue;
+      closed.insert(item->data(0, kSerialRole).toULongLong());
+      closedPaths.insert(item->data(0, kPathRole).toString());
+    }
     const quint64 current = currentItem() ? currentItem()->data(0, kSerialRole).toULongLong() : 0;
     clear();
     items_.clear();
@@ -76,7 +82,11 @@ void NodeTree::Sync(CYbSEKvfGlobalBase& root, bool showMarks) {
       above.push_back(item);
       items_.push_back(item);
     }
-    for (QTreeWidgetItem* item : items_) item->setExpanded(!closed.contains(item->data(0, kSerialRole).toULongLong()));
+    for (std::size_t i = 0; i < items_.size(); ++i) {
+      const bool isClosed = known.contains(entries[i].serial) ? closed.contains(entries[i].serial)
+                                                              : closedPaths.contains(ToQt(found[i].path));
+      items_[i]->setExpanded(!isClosed);
+    }
     entries_ = std::move(entries);
     Select(current);
     viewport()->update();

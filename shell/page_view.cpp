@@ -248,13 +248,16 @@ void PageView::PlacePlots() {
   const Theme& theme = Theme::Get();
   const bool isWide = width() >= theme.Scaled(kSideBySide);
   const auto orientation = isWide ? Qt::Horizontal : Qt::Vertical;
-  if (split_->orientation() == orientation && split_->property("placed").toBool()) return;
-  split_->setProperty("placed", true);
-  split_->setOrientation(orientation);
   const int all = isWide ? width() : height();
   const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
-  const int needed = scroll_->widget()->minimumSizeHint().width() + bar;
-  const int form = isWide ? std::clamp(needed, theme.Scaled(kFormBesidePlot), all * 3 / 5) : all / 2;
+  const int neededWidth = scroll_->widget()->minimumSizeHint().width() + bar;
+  // Above a map the form takes no more than it needs.
+  const int form = isWide ? std::clamp(neededWidth, theme.Scaled(kFormBesidePlot), all * 3 / 5)
+                          : std::min(scroll_->widget()->sizeHint().height(), all / 2);
+  // What the user has moved stays until the page is another one.
+  if (split_->orientation() == orientation && formSize_ == form) return;
+  formSize_ = form;
+  split_->setOrientation(orientation);
   split_->setSizes({form, std::max(all - form, 1)});
 }
 
@@ -298,6 +301,7 @@ void PageView::Sync() {
   for (const auto& widget : widgets_) widget->Sync();
   if (plotPlace_)
     plotPlace_->setVisible(std::ranges::any_of(plots_, [](const Control* control) { return control->IsShown(); }));
+  if (split_ && isVisible()) PlacePlots();
   SyncFindings();
 }
 

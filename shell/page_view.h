@@ -71,6 +71,7 @@ class PageView : public QWidget {
   std::vector<const Control*> plots_;
   QSplitter* split_ = nullptr;
   QWidget* plotPlace_ = nullptr;
+  int formSize_ = 0;  ///< Of the form beside or above a plot, when it was given its place.
   QLabel* findings_;
   QScrollArea* scroll_;
   bool growsDown_ = false, growsRight_ = false;

@@ -5,6 +5,7 @@
 #include <fmt/format.h>
 
 #include "core/kvf.h"
+#include "execution/processed_pages.h"
 #include "pages/document/help_pages.h"
 #include "pages/spatial/plot_content.h"
 #include "platform/files.h"
@@ -60,7 +61,32 @@ bool CTvnHelpView::OnHelp() {
 }
 
 void CTvnHelpView::Describe(PageForm& form) {
-  form.Browser([this] { return std::string(*FindHelpPage(PageName())); });
+  form.Notice([this] {
+    std::string problem;
+    PageText(problem);
+    return problem;
+  });
+  form.Browser([this] {
+        std::string unused;
+        return PageText(unused);
+      })
+      .Folder(std::string(FolderOf(FileOfReport())));
+}
+
+std::string CTvnHelpView::FileOfReport() const {
+  const auto* page = dynamic_cast<const CPreprocessedHTML*>(&Node());
+  return page && !FindHelpPage(page->GetHtml()) ? page->GetFile() : std::string();
+}
+
+std::string CTvnHelpView::PageText(std::string& problem) const {
+  constexpr std::uint64_t kMostBytes = 16 << 20;
+  const std::string file = FileOfReport();
+  FileContent content;
+  if (StampOf(file).size > kMostBytes)
+    problem = fmt::format("{}: it has more than the {} MB that are shown", file, kMostBytes >> 20);
+  else if (!file.empty())
+    problem = ReadWholeFile(file, content).error;
+  return content.data ? std::string(content.Text()) : std::string(*FindHelpPage(PageName()));
 }
 
 void COverviewDlg::Initialize() {

@@ -8,7 +8,8 @@
 
 namespace tervane {
 
-/// Shows the help page of a node whose information is a text.
+/// Shows the help page of a node whose information is a text. Of a page of processed data it may be a file beside the
+/// preprocessor's report.
 class CTvnHelpView : public PageOf<CYbSEKvfBase> {
  public:
   using PageOf::PageOf;
@@ -21,6 +22,12 @@ class CTvnHelpView : public PageOf<CYbSEKvfBase> {
 
  protected:
   void Describe(PageForm& form) override;
+
+ private:
+  /// The file that the node names beside the report; empty for none, and where the program holds a page of that name.
+  std::string FileOfReport() const;
+  /// The text of that file; without one, or where it cannot be read (`problem` says why), the help page.
+  std::string PageText(std::string& problem) const;
 };
 
 /// The whole setup as a text to read.

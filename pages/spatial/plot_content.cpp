@@ -173,9 +173,13 @@ MapContent GridMap(const CYbSEKvfBase& node, const std::shared_ptr<ComputedGrid>
   return map;
 }
 
+MapContent GridFileMap(const CYbSEKvfBase& node, const std::string& path, int item, const GridSlice& slice) {
+  return GridMap(node, RecentGrid(path, item, slice));
+}
+
 MapContent FileMap(const DataFileNode& file, const GridSlice& slice) {
   if (file.File.IsEmpty()) return GridMap(file, nullptr, "No file is chosen.");
-  return GridMap(file, RecentGrid(file.File.Absolute(), file.SelectedItem(), slice));
+  return GridFileMap(file, file.File.Absolute(), file.SelectedItem(), slice);
 }
 
 MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit) {
@@ -290,9 +294,9 @@ int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const s
   return kDataChanged;
 }
 
-void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const FileName& file) {
+void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const FileName& file, std::optional<int> item) {
   if (const COverlaysKvf* overlays = OverlaysOf(node)) {
-    if (PrepareGridState(*overlays, file, std::nullopt, context.host).empty()) return;
+    if (PrepareGridState(*overlays, file, item, context.host).empty()) return;
   }
   if (context.openDataFile) context.openDataFile(file.Absolute());
 }

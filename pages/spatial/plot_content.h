@@ -20,7 +20,9 @@ MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRo
                    const std::string& problem);
 /// The same of a grid that may still have to be computed; null for none.
 MapContent GridMap(const CYbSEKvfBase& node, const std::shared_ptr<ComputedGrid>& grid);
-/// The same of a data file's selected item, the first step and layer unless told.
+/// The same of an item of a data file, the first step and layer unless told.
+MapContent GridFileMap(const CYbSEKvfBase& node, const std::string& path, int item, const GridSlice& slice = {});
+/// The same of a data file's selected item.
 MapContent FileMap(const DataFileNode& file, const GridSlice& slice = {});
 /// A map of a shape file with its attribute.
 MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit);
@@ -39,8 +41,10 @@ void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner);
 /// what changed; `sync` does it.
 int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const std::function<SyncResult()>& sync);
 
-/// Opens a data file of a page in the program's viewer, with the backdrop prepared for it.
-void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const FileName& file);
+/// Opens a data file of a page in the program's viewer, with the backdrop prepared for it and, where one is told, its
+/// item.
+void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const FileName& file,
+                  std::optional<int> item = {});
 /// True when the setup has a name, beside which files can be made; else the user is told so.
 bool MayCreateFile(const PageContext& context);
 

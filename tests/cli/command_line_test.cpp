@@ -12,6 +12,7 @@
 #include <sys/stat.h>
 
 #include "document/setup_lock.h"
+#include "tests/support/preprocessed_run.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -331,6 +332,18 @@ TEST_F(CommandLine, AnUnknownCommandOrAMissingArgumentIsTold) {
   for (const char* command :
        {"new", "check", "tree", "show", "page", "get", "set", "convert", "diff", "keys", "completion"})
     EXPECT_THAT(Tervane({command, "--help"}).out, HasSubstr("Usage: tervane " + std::string(command)));
+}
+
+TEST_F(CommandLine, TreeAndPageShowWhatThePreprocessorLeft) {
+  folder.Write("a.tvd", SetupText(14, ""));
+  test::WritePreprocessedRun(folder.File("a_results"), "a");
+  const std::string page = "ProcData/Preprocessed data/Topography";
+  EXPECT_THAT(Tervane({"tree", "--paths", file}).out, HasSubstr("\n" + page + "\n"));
+  EXPECT_THAT(Tervane({"page", file, page}).out, HasSubstr("map \"\" = grid 48x36, 53 shapes"));
+  folder.Write("a_results/a_PreProcessed.kvf", "target T {\nsection PAGE {\n");
+  const Outcome broken = Tervane({"page", file, page});
+  EXPECT_EQ(broken.status, 2);
+  EXPECT_THAT(broken.err, AllOf(HasSubstr("a_PreProcessed.kvf:3:1"), HasSubstr("there is no Preprocessed data here")));
 }
 
 }  // namespace

@@ -3,14 +3,23 @@
 #include "shell/document_frame.h"
 
 #include <QCheckBox>
+#include <QDialog>
+#include <QPlainTextEdit>
+#include <QTextBrowser>
 #include <QTreeWidget>
+#include <filesystem>
+#include <fstream>
 
 #include <gmock/gmock.h>
 
 #include "shell/find_panel.h"
 #include "shell/findings_view.h"
+#include "shell/log_view.h"
+#include "shell/map_canvas.h"
 #include "shell/node_tree.h"
+#include "shell/series_plot.h"
 #include "tests/shell/opened_setup.h"
+#include "tests/support/preprocessed_run.h"
 
 namespace tervane {
 namespace {
@@ -90,6 +99,148 @@ TEST(DocumentFrame, UndoTakesBackWhatAnyPageChangedAndTheTitleTells) {
   EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "");
   EXPECT_EQ(setup.Frame().Title(), "karup.tvd");
   EXPECT_EQ(setup.Focused<QLineEdit>()->text(), "");
+}
+
+// ---- Processed data
+
+/// A setup with what the preprocessor left of it.
+class PreprocessedSetup : public OpenedSetup {
+ public:
+  PreprocessedSetup() {
+    test::WritePreprocessedRun(Folder().File("karup_results"), "karup");
+    Rebuild();
+  }
+  void Rebuild() {
+    Frame().RebuildProcessedData();
+    QApplication::processEvents();
+  }
+  std::string ReportPath() const { return Folder().File("karup_results/karup_PreProcessed.kvf"); }
+  void GoToPage(const std::string& path) { GoTo("ProcData/Preprocessed data/" + path); }
+  std::string Log() {
+    std::string text;
+    for (const LogView* log : Frame().findChildren<LogView*>()) text += FromQt(log->toPlainText());
+    return text;
+  }
+  /// The widget of that class that the page shows.
+  template <class Widget>
+  Widget* Shown() {
+    // Pages that were left may not be deleted yet.
+    for (auto* page : Frame().findChildren<PageView*>())
+      for (auto* widget : page->findChildren<Widget*>())
+        if (widget->isVisible()) return widget;
+    return nullptr;
+  }
+};
+
+TEST(DocumentFrame, EveryKindOfPageOfProcessedDataIsShown) {
+  PreprocessedSetup setup;
+  const auto map = [&] {
+    auto* canvas = setup.Shown<MapCanvas>();
+    if (!canvas) return std::string("no map");
+    canvas->WaitUntilReady();
+    return Summary(canvas->Content());
+  };
+  const auto text = [&] {
+    const auto* view = setup.Shown<QPlainTextEdit>();
+    return view ? FromQt(view->toPlainText()) : std::string("no text");
+  };
+  using testing::HasSubstr;
+  const NodeTree& tree = *setup.Frame().findChildren<NodeTree*>()[1];
+  setup.GoTo("ProcData");
+  EXPECT_TRUE(setup.Shows("14 pages"));
+  setup.GoToPage("Climate");
+  EXPECT_EQ(map(), "no map");
+  EXPECT_EQ(tree.currentItem()->text(0), "Climate");
+  setup.GoToPage("Climate/Precipitation");
+  ASSERT_TRUE(setup.Shown<SeriesPlot>());
+  EXPECT_THAT(FromQt(setup.Shown<SeriesPlot>()->ValuesAsText()), HasSubstr("Precipitation"));
+  setup.GoToPage("River bed");
+  EXPECT_THAT(FromQt(setup.Shown<QLineEdit>()->text()), HasSubstr("karup_1d.nds1"));
+  EXPECT_TRUE(setup.Shown<QLineEdit>()->isReadOnly());
+  setup.GoToPage("Topography");
+  EXPECT_EQ(map(), "grid 48x36, 53 shapes");
+  setup.GoToPage("Topography/River links");  // has no page of its own
+  EXPECT_EQ(setup.Frame().CurrentPath(), "ProcData/Preprocessed data/Topography");
+  setup.GoToPage("Saturated Zone/Lower level of layers");
+  EXPECT_EQ(map(), "grid 48x36");
+  setup.GoToPage("Summary");
+  EXPECT_EQ(text(), "Cells of the model domain: 1206\nCells with a river link: 97\n\nNo cell had to be filled.");
+  setup.GoToPage("Log");
+  EXPECT_THAT(text(), HasSubstr("  40  reading and interpolating item 280 ... done\n"));
+  setup.GoToPage("CPreprocessedHTML");
+  EXPECT_THAT(FromQt(setup.Shown<QTextBrowser>()->toPlainText()), HasSubstr("455 mm"));
+  setup.GoToPage("Model Domain and Grid/Sub-basins");
+  EXPECT_EQ(map(), "3 shapes");
+  EXPECT_FALSE(setup.Session().IsModified());
+}
+
+TEST(DocumentFrame, RiverLinksAreDrawnInDarkBlueWhereTheyLie) {
+  PreprocessedSetup setup;
+  setup.GoToPage("Topography");
+  auto* canvas = setup.Shown<MapCanvas>();
+  ASSERT_TRUE(canvas);
+  canvas->WaitUntilReady();
+  canvas->Zoom(4);
+  const Shape& link = canvas->Content().shapes.front().shapes->GetData().front();
+  canvas->Pan(canvas->Window().rect.center() - canvas->Window().ToScreen(link.points[0]));
+  const QImage picture = canvas->grab().toImage();
+  // The network itself crosses the link somewhere.
+  int blue = 0;
+  for (double part = 0; part <= 1; part += 0.05) {
+    const MapPoint place{link.points[0].x + part * (link.points[1].x - link.points[0].x),
+                         link.points[0].y + part * (link.points[1].y - link.points[0].y)};
+    blue += picture.pixelColor(canvas->Window().ToScreen(place).toPoint()) == QColor(0, 0, 0x9a);
+  }
+  EXPECT_GE(blue, 3);
+}
+
+TEST(DocumentFrame, ARebuildKeepsThePageThatIsShownAndFindsALostOneAgain) {
+  PreprocessedSetup setup;
+  const std::string page = "ProcData/Preprocessed data/Saturated Zone/Second layer";
+  setup.GoTo(page);
+  setup.Rebuild();
+  EXPECT_EQ(setup.Frame().CurrentPath(), page);
+  EXPECT_TRUE(setup.Shown<MapCanvas>());
+  // Half written: the report has no pages, and the log says why, once.
+  const std::string report = test::ReadFile(setup.ReportPath());
+  for (const std::size_t size : {report.size() / 3, report.size() / 2}) {
+    std::ofstream(setup.ReportPath()) << report.substr(0, size);
+    setup.Rebuild();
+    setup.Rebuild();
+    EXPECT_EQ(setup.Frame().CurrentPath(), "ProcData");
+    EXPECT_TRUE(setup.Shows("karup_PreProcessed.kvf:"));
+  }
+  EXPECT_EQ(QString::fromStdString(setup.Log()).count(ToQt(setup.ReportPath() + ":")), 2);
+  std::ofstream(setup.ReportPath()) << report;
+  setup.Rebuild();
+  EXPECT_EQ(setup.Frame().CurrentPath(), page);
+  // A page of the setup is left alone, and one that the user left is not forced on him.
+  setup.GoTo("SimSpec/SimTitle:Title");
+  setup.Type("being typed");
+  setup.Rebuild();
+  EXPECT_EQ(setup.Frame().CurrentPath(), "SimSpec/SimTitle");
+  EXPECT_EQ(setup.Focused<QLineEdit>()->text(), "being typed");
+  EXPECT_FALSE(setup.Session().IsModified());
+}
+
+TEST(DocumentFrame, AReportThatChangesOnDiskIsNoticedExceptUnderADialog) {
+  OpenedSetup setup;
+  const NodeTree& tree = *setup.Frame().findChildren<NodeTree*>()[1];
+  const auto pages = [&] { return tree.findItems("Topography", Qt::MatchExactly | Qt::MatchRecursive).size(); };
+  EXPECT_EQ(pages(), 0);
+  QDialog dialog(&setup.Window());
+  dialog.setModal(true);
+  dialog.show();
+  test::WritePreprocessedRun(setup.Folder().File("karup_results"), "karup");
+  QTest::qWait(1300);
+  EXPECT_EQ(pages(), 0);
+  dialog.hide();
+  EXPECT_TRUE(QTest::qWaitFor([&] { return pages() == 1; }, 5000));
+  // Deleted, its pages stay until there is a new one.
+  setup.GoTo("ProcData");
+  std::filesystem::remove(setup.Folder().File("karup_results/karup_PreProcessed.kvf"));
+  EXPECT_TRUE(QTest::qWaitFor([&] { return setup.Shows("no more on disk"); }, 5000));
+  EXPECT_EQ(pages(), 1);
 }
 
 }  // namespace
