@@ -160,7 +160,7 @@ TEST(MainWindow, WhatACrashLeftIsOfferedOnlyWhileItsSetupIsOpenNowhere) {
   ASSERT_TRUE(QDir().mkpath(ToQt(folder)));
   AutosaveContent content;
   content.setup = setup.Path();
-  content.process = EditorProcess::This();
+  content.process = RunningProcess::This();
   content.process.started = "earlier";
   content.text = test::SetupText(14, "section SimSpec {\nsection SimTitle {\nTitle = \"left\"\n}\n}");
   ASSERT_TRUE(WriteAutosave(NewAutosaveName(setup.Path(), folder), content).Ok());
