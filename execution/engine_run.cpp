@@ -40,6 +40,13 @@ bool MayRun(const std::optional<RunningProcess>& process) { return process && pr
 
 }  // namespace
 
+std::optional<RunRequest> RequestOf(const CYbSimpleLaunch& launch, const std::string& resultFolder,
+                                    const std::string& enginePath, std::string& problem) {
+  const std::string engine = FindEngine(launch.Engine, EnginePlaces::Here(enginePath), problem);
+  if (engine.empty()) return std::nullopt;
+  return RunRequest{launch.Input, resultFolder, engine, launch.Options, launch.ExtraLog, launch.Report};
+}
+
 bool EngineRun::Start(const RunRequest& request, std::string& problem) {
   std::error_code error;
   std::filesystem::create_directories(NativePath(request.resultFolder), error);

@@ -9,6 +9,7 @@
 #include <string>
 #include <vector>
 
+#include "core/engine_shell.h"
 #include "execution/run_state.h"
 
 namespace tervane {
@@ -22,6 +23,11 @@ struct RunRequest {
   std::string extraLog;      ///< May be empty.
   std::string report;        ///< What the run must leave; may be empty.
 };
+
+/// The request that a document's start comes to; nothing, with the problem, when the engine is not there.
+/// `enginePath` is the setting of that name.
+std::optional<RunRequest> RequestOf(const CYbSimpleLaunch& launch, const std::string& resultFolder,
+                                    const std::string& enginePath, std::string& problem);
 
 /// A run that was started or found, by whom ever. Each `Look` reads the files anew; nothing waits.
 class EngineRun {
