@@ -48,6 +48,8 @@ RunNews RunFollower::Take() {
   news.state = news_.state;
   news.outcome = news_.outcome;
   std::swap(news, news_);
+  isEndTaken_ = news.outcome != RunOutcome::GoingOn;
+  if (isEndTaken_) changed_.notify_all();
   return news;
 }
 
@@ -86,6 +88,10 @@ void RunFollower::Follow() {
   news_.log.Add(std::move(rest));
   news_.extraLog.Add(extraLines_.Rest());
   news_.outcome = run_.Outcome();
+  changed_.wait(lock, [this] { return isLeft_ || isEndTaken_; });
+  if (!isEndTaken_) return;
+  lock.unlock();
+  run_.MarkTold();
 }
 
 bool RunFollower::ReadLog() {

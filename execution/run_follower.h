@@ -38,6 +38,7 @@ class RunFollower {
   RunFollower(const RunFollower&) = delete;
   RunFollower& operator=(const RunFollower&) = delete;
 
+  /// Once the end was handed out here, the files tell that the user knows of it.
   RunNews Take();
   void Stop();
   /// Waits until the files were read once, at most this long.
@@ -61,7 +62,7 @@ class RunFollower {
   std::condition_variable changed_;
   RunNews news_;
   int stops_ = 0;
-  bool isLeft_ = false, hasLooked_ = false;
+  bool isLeft_ = false, hasLooked_ = false, isEndTaken_ = false;
   std::thread thread_;
 };
 

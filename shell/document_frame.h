@@ -19,6 +19,7 @@ class QVBoxLayout;
 
 namespace tervane {
 
+class DocumentRun;
 class FindPanel;
 class FindingsView;
 class LogView;
@@ -37,6 +38,8 @@ class DocumentFrame : public QWidget {
   ~DocumentFrame() override;
 
   EditSession& Session() const { return *session_; }
+  /// The engine that runs the setup.
+  DocumentRun& Run() const { return *run_; }
   /// The name of the file, with a star when there are changes to save.
   QString Title() const;
   QString Name() const;
@@ -88,6 +91,8 @@ class DocumentFrame : public QWidget {
   void ChangesWanted();
   /// A data file is to be shown in a viewer.
   void DataFileWanted(const QString& path);
+  /// An engine that ran the setup has ended: what it leaves in the result folder is to be read anew.
+  void RunEnded();
 
  private:
   void BuildBody();
@@ -101,6 +106,9 @@ class DocumentFrame : public QWidget {
   void LeaveGoneNode();
   void RunAutosave();
   void TellReport();
+  void FollowRun();
+  void ShowFindings();
+  void TellRunEnd(bool isDone, bool wasFound);
 
   std::unique_ptr<EditSession> session_;
   QString name_;
@@ -116,17 +124,18 @@ class DocumentFrame : public QWidget {
   std::vector<NodeTree*> trees_;
   FindPanel* find_ = nullptr;
   FindingsView* findings_ = nullptr;
-  LogView* log_ = nullptr;
+  std::unique_ptr<DocumentRun> run_;
+  LogView *log_ = nullptr, *riverLog_ = nullptr;
   QWidget* pagePlace_ = nullptr;
   QPointer<PageView> page_;
-  QPointer<Banner> diskBanner_;
+  QPointer<Banner> diskBanner_, runBanner_;
 
   std::uint64_t current_ = 0;
   std::vector<std::uint64_t> above_;    ///< The nodes above the one that is shown, nearest first.
   std::vector<std::uint64_t> visited_;  ///< For going back and forward.
   std::ptrdiff_t place_ = -1;           ///< Of the shown node in `visited_`.
   bool isGoing_ = false;
-  QTimer autosave_, disk_;
+  QTimer autosave_, disk_, findingsLater_;
 };
 
 }  // namespace tervane
