@@ -12,8 +12,8 @@
 #include "cli/json.h"
 #include "cli/setup_file.h"
 #include "execution/engine_line.h"
-#include "execution/engine_log.h"
-#include "execution/engine_run.h"
+#include "execution/run_log.h"
+#include "execution/setup_run.h"
 #include "platform/os_process.h"
 
 namespace tervane {
@@ -40,10 +40,10 @@ class TerminalShell : public EngineShell {
   void Start(const CYbSimpleLaunch& launch, bool showsProgress) override;
 
  private:
-  void Follow(EngineRun& run);
+  void Follow(SetupRun& run);
   void CopyLog(LogReader& log, LineCutter& cutter);
   void Understand(const LogPiece& lines);
-  void Tell(const EngineRun& run, const std::string& sentence);
+  void Tell(const SetupRun& run, const std::string& sentence);
 
   const CFlowModelDoc& document_;
   const RunOptions& options_;
@@ -56,7 +56,7 @@ class TerminalShell : public EngineShell {
 
 void TerminalShell::Start(const CYbSimpleLaunch& launch, bool /*showsProgress*/) {
   std::string problem;
-  EngineRun run;
+  SetupRun run;
   const std::optional<RunRequest> request = RequestOf(launch, document_.getResultFolder(), options_.engines, problem);
   os::KeepEndRequests();
   if (!request || !run.Start(*request, problem)) {
@@ -71,7 +71,7 @@ void TerminalShell::Start(const CYbSimpleLaunch& launch, bool /*showsProgress*/)
   if (isInterrupted_) status_ = kInterrupted;
 }
 
-void TerminalShell::Follow(EngineRun& run) {
+void TerminalShell::Follow(SetupRun& run) {
   LogReader log(run.Files().log);
   LineCutter cutter;
   for (;;) {
@@ -103,7 +103,7 @@ void TerminalShell::Understand(const LogPiece& lines) {
     if (std::optional<EngineMessage> message = EngineMessageOf(lines.Line(i))) messages_.push_back(std::move(*message));
 }
 
-void TerminalShell::Tell(const EngineRun& run, const std::string& sentence) {
+void TerminalShell::Tell(const SetupRun& run, const std::string& sentence) {
   fmt::print(streams_.err, "{}: {}\n", options_.file, sentence);
   if (!options_.json) return;
   const RunState& state = run.State();

@@ -28,7 +28,7 @@ bool IsOfRun(const std::string& path, const RunState& state) {
 
 }  // namespace
 
-RunFollower::RunFollower(EngineRun run) : run_(std::move(run)), log_(run_.Files().log) {
+RunFollower::RunFollower(SetupRun run) : run_(std::move(run)), log_(run_.Files().log) {
   news_.state = run_.State();
   thread_ = std::thread([this] { Follow(); });
 }

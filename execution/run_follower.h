@@ -11,8 +11,8 @@
 #include <vector>
 
 #include "execution/engine_line.h"
-#include "execution/engine_log.h"
-#include "execution/engine_run.h"
+#include "execution/run_log.h"
+#include "execution/setup_run.h"
 
 namespace tervane {
 
@@ -33,7 +33,7 @@ class RunFollower {
   /// What an engine says in messages beyond this number stands in the log alone.
   static constexpr std::size_t kMostMessages = 500;
 
-  explicit RunFollower(EngineRun run);
+  explicit RunFollower(SetupRun run);
   ~RunFollower();
   RunFollower(const RunFollower&) = delete;
   RunFollower& operator=(const RunFollower&) = delete;
@@ -51,7 +51,7 @@ class RunFollower {
   bool ReadExtraLog();
   void Understand(const LogPiece& lines);
 
-  EngineRun run_;
+  SetupRun run_;
   LogReader log_;
   LineCutter lines_;
   std::optional<LogReader> extraLog_;

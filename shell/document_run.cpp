@@ -48,7 +48,7 @@ bool DocumentRun::IsShiftHeld() const { return QGuiApplication::keyboardModifier
 
 void DocumentRun::Start(const CYbSimpleLaunch& launch, bool showsProgress) {
   std::string problem;
-  EngineRun run;
+  SetupRun run;
   const std::optional<RunRequest> request =
       RequestOf(launch, session_.Document().getResultFolder(), host_.Setting(kEnginePathSetting), problem);
   if (!request || !run.Start(*request, problem)) {
@@ -63,7 +63,7 @@ void DocumentRun::Start(const CYbSimpleLaunch& launch, bool showsProgress) {
 
 void DocumentRun::FindRun() {
   if (isGoing_ || session_.Path().empty()) return;
-  EngineRun run;
+  SetupRun run;
   // The end of a run that was followed here is told already, whatever stands in its files.
   if (!run.Find(RunFilesOf(session_.Document().getResultFolder(), session_.Path())) || run.State().id == state_.id)
     return;
@@ -72,7 +72,7 @@ void DocumentRun::FindRun() {
   Follow(std::move(run), true);
 }
 
-void DocumentRun::Follow(EngineRun run, bool wasFound) {
+void DocumentRun::Follow(SetupRun run, bool wasFound) {
   logFile_ = ToQt(run.Files().log);
   state_ = run.State();
   name_ = QFileInfo(ToQt(state_.setup)).fileName();

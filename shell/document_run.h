@@ -77,7 +77,7 @@ class DocumentRun : public QObject, public EngineShell {
   void Ended(bool isDone, bool wasFound);
 
  private:
-  void Follow(EngineRun run, bool wasFound);
+  void Follow(SetupRun run, bool wasFound);
   void Tick();
   void End(RunOutcome outcome);
 

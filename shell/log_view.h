@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <functional>
 
-#include "execution/engine_log.h"
+#include "execution/run_log.h"
 
 namespace tervane {
 

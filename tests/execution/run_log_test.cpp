@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "execution/engine_log.h"
+#include "execution/run_log.h"
 
 #include <filesystem>
 #include <fstream>
@@ -19,7 +19,7 @@ std::string Lines(const LogPiece& piece) {
   return text;
 }
 
-TEST(EngineLog, LinesAreTheSameInWhateverPiecesTheyCome) {
+TEST(RunLog, LinesAreTheSameInWhateverPiecesTheyCome) {
   const std::string bytes = "one\n\ntwo\r\nthree\rfour\r\r\nfive \xff\n\nsix";
   const std::string expected = "[one][][two][three][four][][five \xff][][six]";
   for (std::size_t size = 1; size <= bytes.size(); ++size) {
@@ -31,7 +31,7 @@ TEST(EngineLog, LinesAreTheSameInWhateverPiecesTheyCome) {
   }
 }
 
-TEST(EngineLog, OfALineWithoutEndTheBeginningIsKept) {
+TEST(RunLog, OfALineWithoutEndTheBeginningIsKept) {
   LineCutter cutter;
   for (int i = 0; i < 1000; ++i) EXPECT_EQ(cutter.Cut(std::string(1000, 'x')).Count(), 0u);
   const LogPiece lines = cutter.Cut("\nnext\n");
@@ -40,7 +40,7 @@ TEST(EngineLog, OfALineWithoutEndTheBeginningIsKept) {
   EXPECT_EQ(lines.Line(1), "next");
 }
 
-TEST(EngineLog, TheTailKeepsTheLastLinesUnderTheirNumbers) {
+TEST(RunLog, TheTailKeepsTheLastLinesUnderTheirNumbers) {
   LogTail tail;
   constexpr std::size_t kAll = 350'000;
   LogPiece piece;
@@ -57,7 +57,7 @@ TEST(EngineLog, TheTailKeepsTheLastLinesUnderTheirNumbers) {
     EXPECT_EQ(tail.Line(i), std::to_string(tail.Dropped() + i));
 }
 
-TEST(EngineLog, AFileThatBeginsAnewIsReadFromItsBeginning) {
+TEST(RunLog, AFileThatBeginsAnewIsReadFromItsBeginning) {
   const test::TempFolder folder;
   LogReader reader(folder.File("run.log"));
   EXPECT_EQ(reader.Read(100), "");

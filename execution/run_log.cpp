@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "execution/engine_log.h"
+#include "execution/run_log.h"
 
 #include <algorithm>
 

@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "execution/engine_run.h"
+#include "execution/setup_run.h"
 
 #include <atomic>
 #include <filesystem>
@@ -47,7 +47,7 @@ std::optional<RunRequest> RequestOf(const CYbSimpleLaunch& launch, const std::st
   return RunRequest{launch.Input, resultFolder, engine, launch.Options, launch.ExtraLog, launch.Report};
 }
 
-bool EngineRun::Start(const RunRequest& request, std::string& problem) {
+bool SetupRun::Start(const RunRequest& request, std::string& problem) {
   std::error_code error;
   std::filesystem::create_directories(NativePath(request.resultFolder), error);
   if (error) {
@@ -88,7 +88,7 @@ bool EngineRun::Start(const RunRequest& request, std::string& problem) {
   return false;
 }
 
-bool EngineRun::Find(const RunFiles& files) {
+bool SetupRun::Find(const RunFiles& files) {
   std::string problem;
   std::optional<RunState> found = ReadRunState(files.state, problem);
   if (!found || found->isTold) return false;
@@ -100,7 +100,7 @@ bool EngineRun::Find(const RunFiles& files) {
   return true;
 }
 
-bool EngineRun::ReadState() {
+bool SetupRun::ReadState() {
   std::string problem;
   std::optional<RunState> read = ReadRunState(files_.state, problem);
   if (!read || read->id != state_.id) return false;
@@ -108,7 +108,7 @@ bool EngineRun::ReadState() {
   return state_.HasEnded();
 }
 
-bool EngineRun::Look() {
+bool SetupRun::Look() {
   if (outcome_ != RunOutcome::GoingOn) return false;
   // Asked in this order, since the end is written before the runner is gone.
   const std::optional<os::ProcessEnd> runnerEnd = runner_.End();
@@ -131,7 +131,7 @@ bool EngineRun::Look() {
   return false;
 }
 
-std::string EngineRun::Stop() {
+std::string SetupRun::Stop() {
   ++stopsWanted_;
   const RunningProcess& where = state_.runner ? *state_.runner : state_.starter;
   if (!where.IsOnThisHost()) return fmt::format("the engine runs on host {}: stop it there", where.host);
@@ -139,7 +139,7 @@ std::string EngineRun::Stop() {
   return {};
 }
 
-void EngineRun::SendStops() {
+void SetupRun::SendStops() {
   // Before the runner has told of itself there is nobody to ask.
   for (; state_.runner && stopsSent_ < stopsWanted_; ++stopsSent_) {
     if (MayRun(state_.runner))
@@ -149,7 +149,7 @@ void EngineRun::SendStops() {
   }
 }
 
-void EngineRun::MarkTold() {
+void SetupRun::MarkTold() {
   state_.isTold = true;
   HeldRunState held;
   std::string ignored;

@@ -30,7 +30,7 @@ std::optional<RunRequest> RequestOf(const CYbSimpleLaunch& launch, const std::st
                                     const std::string& enginePath, std::string& problem);
 
 /// A run that was started or found, by whom ever. Each `Look` reads the files anew; nothing waits.
-class EngineRun {
+class SetupRun {
  public:
   /// Starts the engine. False with the problem when it could not be started, also because another run of this setup
   /// goes on; what the engine itself meets at its start shows at a later look.

@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "execution/engine_run.h"
+#include "execution/setup_run.h"
 
 #include <chrono>
 #include <csignal>
@@ -42,16 +42,16 @@ class Running : public testing::Test {
   RunRequest Request(const std::string& engine, const std::string& options = "") const {
     return {folder.File("basin/karup.tvd"), folder.File("basin/results"), engine, options, "", ""};
   }
-  EngineRun Started(const RunRequest& request) {
-    EngineRun run;
+  SetupRun Started(const RunRequest& request) {
+    SetupRun run;
     std::string problem;
     EXPECT_TRUE(run.Start(request, problem)) << problem;
     return run;
   }
-  EngineRun Started(const std::string& commands) {
+  SetupRun Started(const std::string& commands) {
     return Started(Request(test::WriteEngine(folder, "Engine", commands)));
   }
-  std::string Ended(EngineRun& run) {
+  std::string Ended(SetupRun& run) {
     EXPECT_TRUE(Soon([&] { return !run.Look(); }));
     return OutcomeSentence(run.State());
   }
@@ -73,7 +73,7 @@ class Running : public testing::Test {
 TEST_F(Running, TheEngineGetsSetupAndOptionsInTheSetupsFolderAndItsWordsAreKept) {
   const std::string engine =
       test::WriteEngine(folder, "my engines/Engine", "echo \"$#: $1 $2 $3\"; pwd; echo oops >&2");
-  EngineRun run = Started(Request(engine, "/Engine  1"));
+  SetupRun run = Started(Request(engine, "/Engine  1"));
   EXPECT_THAT(Ended(run), MatchesRegex("The run is done after 0\\.[0-9] s\\."));
   EXPECT_EQ(ReadFile(run.Files().log),
             "3: " + folder.File("basin/karup.tvd") + " /Engine 1\n" + folder.File("basin") + "\noops\n");
@@ -97,7 +97,7 @@ TEST_F(Running, HowTheEngineEndedIsToldInWords) {
        }) {
     RunRequest request = Request(test::WriteEngine(folder, "Engine", c.commands));
     request.report = folder.File("basin/report");
-    EngineRun run = Started(request);
+    SetupRun run = Started(request);
     EXPECT_THAT(Ended(run), testing::ContainsRegex(c.sentence)) << c.commands;
     EXPECT_EQ(run.Outcome(), c.outcome) << c.commands;
   }
@@ -114,14 +114,14 @@ TEST_F(Running, AnEngineThatCannotBeStartedTellsWhy) {
       {"#!/no/such/program\n", "its first line"},
   };
   for (const auto& [bytes, why] : cases) {
-    EngineRun run = Started(Request(test::WriteProgram(folder, "Engine", bytes)));
+    SetupRun run = Started(Request(test::WriteProgram(folder, "Engine", bytes)));
     EXPECT_THAT(Ended(run), AllOf(HasSubstr(folder.File("Engine") + " cannot be started: "), HasSubstr(why)));
     EXPECT_EQ(run.Outcome(), RunOutcome::NotStarted);
   }
 }
 
 TEST_F(Running, AStopReachesAllThatTheEngineHasStarted) {
-  EngineRun run = Started(
+  SetupRun run = Started(
       "sleep 1000 & echo $! >>children; setsid sleep 1000 & echo $! >>children\n"
       "(trap '' TERM; sleep 1000 & echo $! >>children; touch begun; wait) & echo $! >>children; wait");
   ASSERT_TRUE(HasBegun());
@@ -131,7 +131,7 @@ TEST_F(Running, AStopReachesAllThatTheEngineHasStarted) {
 }
 
 TEST_F(Running, AnEngineThatDoesNotListenIsEndedByForce) {
-  EngineRun run = Started("trap '' TERM; touch begun; while :; do sleep 0.05; done");
+  SetupRun run = Started("trap '' TERM; touch begun; while :; do sleep 0.05; done");
   ASSERT_TRUE(HasBegun());
   EXPECT_TRUE(run.Look());
   run.Stop();
@@ -146,15 +146,15 @@ TEST_F(Running, AnEngineThatDoesNotListenIsEndedByForce) {
 }
 
 TEST_F(Running, WhatAnEngineLeavesRunningIsEndedAndTold) {
-  EngineRun run = Started("sleep 1000 & echo $! >children; echo done");
+  SetupRun run = Started("sleep 1000 & echo $! >children; echo done");
   EXPECT_THAT(Ended(run), AllOf(HasSubstr("The run is done"), HasSubstr("It left 1 of its processes running")));
   EXPECT_EQ(Children().size(), 1u);
 }
 
 TEST_F(Running, OneSetupRunsOnlyOnce) {
-  EngineRun first = Started("touch begun; while [ ! -e go ]; do sleep 0.02; done");
+  SetupRun first = Started("touch begun; while [ ! -e go ]; do sleep 0.02; done");
   ASSERT_TRUE(HasBegun());
-  EngineRun second;
+  SetupRun second;
   std::string problem;
   EXPECT_FALSE(second.Start(Request(folder.File("Engine")), problem));
   EXPECT_THAT(problem, HasSubstr("this setup is being run already, by "));
@@ -167,27 +167,27 @@ TEST_F(Running, OneSetupRunsOnlyOnce) {
 }
 
 TEST_F(Running, AnotherProgramFindsTheRunAndIsToldOfItsEndOnce) {
-  EngineRun first = Started("touch begun; while [ ! -e go ]; do sleep 0.02; done; exit 5");
+  SetupRun first = Started("touch begun; while [ ! -e go ]; do sleep 0.02; done; exit 5");
   ASSERT_TRUE(HasBegun());
-  EngineRun found;
+  SetupRun found;
   ASSERT_TRUE(found.Find(first.Files()));
   EXPECT_TRUE(found.Look());
   folder.Write("basin/go", "");
   EXPECT_THAT(Ended(found), HasSubstr("exit status 5"));
-  EngineRun later;
+  SetupRun later;
   EXPECT_TRUE(later.Find(first.Files()));
   found.MarkTold();
   EXPECT_FALSE(later.Find(first.Files()));
 }
 
 TEST_F(Running, WithoutItsRunnerTheEngineGoesOnAndCanBeStopped) {
-  EngineRun run = Started("echo $$ >>children; touch begun; while [ ! -e go ]; do sleep 0.02; done");
+  SetupRun run = Started("echo $$ >>children; touch begun; while [ ! -e go ]; do sleep 0.02; done");
   ASSERT_TRUE(HasBegun());
   ASSERT_TRUE(Soon([&] { return run.Look() && run.State().program; }));
   kill(static_cast<pid_t>(run.State().runner->process), SIGKILL);
   std::this_thread::sleep_for(100ms);
   EXPECT_TRUE(run.Look());
-  EngineRun second;
+  SetupRun second;
   std::string problem;
   EXPECT_FALSE(second.Start(Request(folder.File("Engine")), problem));
   run.Stop();
@@ -196,7 +196,7 @@ TEST_F(Running, WithoutItsRunnerTheEngineGoesOnAndCanBeStopped) {
 
 TEST_F(Running, AFileOfTheUsersUnderTheNameOfTheStateStays) {
   const std::string own = folder.Write("basin/results/karup_Run.txt", "notes of mine");
-  EngineRun run;
+  SetupRun run;
   std::string problem;
   EXPECT_FALSE(run.Start(Request(test::WriteEngine(folder, "Engine", "true")), problem));
   EXPECT_THAT(problem, HasSubstr("karup_Run.txt is none of the files that a run keeps"));
@@ -204,7 +204,7 @@ TEST_F(Running, AFileOfTheUsersUnderTheNameOfTheStateStays) {
 }
 
 TEST_F(Running, AStateThatIsNotWholeIsNoState) {
-  EngineRun run = Started("true");
+  SetupRun run = Started("true");
   Ended(run);
   std::string text = ReadFile(run.Files().state);
   text[text.find("status: 0") + 8] = '7';
