@@ -102,8 +102,8 @@ class Probe : public QObject {
 
 void TellDelays(const std::string& while_, std::vector<double> delays) {
   std::ranges::sort(delays);
-  TellPeer(fmt::format("99.9 % of {} events wait, {}", delays.size(), while_),
-           delays[delays.size() * 999 / 1000], "ms");
+  TellPeer(fmt::format("99.9 % of {} events wait, {}", delays.size(), while_), delays[delays.size() * 999 / 1000],
+           "ms");
   Tell("the longest wait, " + while_, delays.back(), 50, "ms");
 }
 

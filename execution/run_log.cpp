@@ -131,6 +131,13 @@ void LogTail::Add(std::string_view line) {
 }
 
 void LogTail::Add(LogTail other) {
+  if (other.dropped_ > 0) {
+    // What went there came behind all that is kept here.
+    dropped_ += count_ + other.dropped_;
+    count_ = bytes_ = 0;
+    pieces_.clear();
+  }
+  longest_ = std::max(longest_, other.longest_);
   for (Placed& placed : other.pieces_) Add(std::move(placed.piece));
 }
 

@@ -375,12 +375,14 @@ const std::optional<ProcessEnd>& ProgramTree::End() {
 }
 
 std::size_t ProgramTree::Count() {
-  End();
 #ifdef __linux__
-  return Descendants().size();
+  const std::size_t count = Descendants().size();
 #else
-  return id_ != 0 && kill(-static_cast<pid_t>(id_), 0) == 0 ? 1 : 0;
+  const std::size_t count = id_ != 0 && kill(-static_cast<pid_t>(id_), 0) == 0 ? 1 : 0;
 #endif
+  // Those that have ended do not count, and are to leave the table of processes.
+  End();
+  return count;
 }
 
 void ProgramTree::AskToEnd() {
