@@ -1,9 +1,9 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// How long an event waits in the desktop while an engine prints: 100,000 lines a second, and 1 GB as fast as it can. A
-// thread posts an event each millisecond and the window's thread notes how late it comes. Run it with
-// QT_QPA_PLATFORM=offscreen. The engine is this program again.
+// How long an event waits in the desktop while an engine prints: 100,000 lines a second, 1 GB as fast as it can, and
+// messages that become findings. A thread posts an event each millisecond and the window's thread notes how late it
+// comes. Run it with QT_QPA_PLATFORM=offscreen. The engine is this program again.
 #include <QApplication>
 #include <QCoreApplication>
 #include <QElapsedTimer>
@@ -59,6 +59,15 @@ int PrintLines(int perSecond, int seconds) {
 int PrintGigabyte() {
   const std::string line = "time step 4711, water balance error 1.2e-05 mm, 3 iterations\n";
   for (std::size_t done = 0; done < 1'000'000'000; done += line.size()) fmt::print("{}", line);
+  return 0;
+}
+
+int PrintMessages() {
+  for (int i = 0; i < 1000; ++i) {
+    fmt::print("error: SimSpec/SimTitle:Title: problem {} of many\n", i);
+    std::fflush(stdout);
+    std::this_thread::sleep_for(std::chrono::milliseconds(5));
+  }
   return 0;
 }
 
@@ -151,6 +160,7 @@ void Measure() {
   MeasureIdle(3);
   MeasureRun(window, engine, "--lines 100000 10", "100,000 lines a second");
   MeasureRun(window, engine, "--gigabyte", "1 GB at once");
+  MeasureRun(window, engine, "--messages", "1,000 messages");
 }
 
 }  // namespace
@@ -163,6 +173,7 @@ int main(int argc, char** argv) {
   // Behind them the runner puts the setup and its options.
   if (mode == "--lines" && argc > 3) return PrintLines(std::atoi(argv[2]), std::atoi(argv[3]));
   if (mode == "--gigabyte") return PrintGigabyte();
+  if (mode == "--messages") return PrintMessages();
   QApplication application(argc, argv);
   const tervane::Theme theme;
   Measure();

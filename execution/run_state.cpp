@@ -20,6 +20,8 @@ constexpr std::string_view kFirstLine = "A run of a Tervane setup. The program t
 /// More than any state holds; reserved from the first moment.
 constexpr std::size_t kSize = 32768;
 
+constexpr std::int64_t kLongestStart = 60'000;
+
 std::string Time(std::int64_t milliseconds) {
   return CYbDateTime::FromSecondsSinceEpoch(milliseconds / 1000).Format("%Y-%m-%d %H:%M:%S");
 }
@@ -97,7 +99,8 @@ std::int64_t NowInMilliseconds() {
 
 bool MayStillRun(const RunState& state) {
   if (state.HasEnded()) return false;
-  if (!state.runner) return state.starter.MayRun();
+  // A runner begins at once, or never.
+  if (!state.runner) return state.starter.MayRun() && NowInMilliseconds() - state.begun < kLongestStart;
   return state.runner->MayRun() || (state.program && state.program->MayRun());
 }
 

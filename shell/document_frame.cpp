@@ -309,7 +309,14 @@ void DocumentFrame::Refresh(int hint) {
 void DocumentFrame::ShowFindings() {
   findingsLater_.stop();
   std::vector<SetupFinding> findings = FindingsOf(session_->Document());
-  for (const EngineMessage& message : run_->Messages()) findings.push_back(FindingOf(session_->Document(), message));
+  for (const EngineMessage& message : run_->Messages()) {
+    SetupFinding finding = FindingOf(session_->Document(), message);
+    // An engine checks what the editor checks too.
+    const bool isKnown = std::ranges::any_of(findings, [&](const SetupFinding& known) {
+      return known.path == finding.path && known.key == finding.key && known.text == finding.text;
+    });
+    if (!isKnown) findings.push_back(std::move(finding));
+  }
   findings_->Show(std::move(findings));
   const int count = findings_->Count();
   bottomTabs_->setTabText(bottomTabs_->indexOf(findings_), count ? tr("Findings (%1)").arg(count) : tr("Findings"));
@@ -349,6 +356,11 @@ void DocumentFrame::TellRunEnd(bool isDone, bool wasFound) {
   QApplication::alert(this);
   emit StateChanged();
   emit RunEnded();
+}
+
+void DocumentFrame::Settle() {
+  run_->Settle();
+  ShowFindings();
 }
 
 // ---- Editing

@@ -80,6 +80,9 @@ class DocumentFrame : public QWidget {
   /// Makes all anew that was computed from colours and sizes.
   void Redraw();
 
+  /// Waits until what is known of a run is shown; for pictures.
+  void Settle();
+
   QByteArray SaveLayout() const;
   void RestoreLayout(const QByteArray& layout);
 

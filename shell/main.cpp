@@ -19,7 +19,6 @@
 
 #include "platform/os.h"
 #include "shell/document_frame.h"
-#include "shell/document_run.h"
 #include "shell/main_window.h"
 #include "shell/program.h"
 #include "shell/qt_text.h"
@@ -93,7 +92,7 @@ int Run(const Typed& typed, QApplication& application) {
     QTimer::singleShot(0, &window, [&window] { window.OfferRecoveries(); });
     return QApplication::exec();
   }
-  if (window.Frame()) window.Frame()->Run().Settle();
+  if (window.Frame()) window.Frame()->Settle();
   // Layouts settle when events have run.
   for (int i = 0; i < 3; ++i) application.processEvents();
   if (!WithFewColors(window.grab().toImage()).save(ToQt(typed.screenshot))) {

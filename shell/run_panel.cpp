@@ -26,6 +26,8 @@ RunPanel::RunPanel(DocumentRun& run) : run_(run) {
   text_->setTextFormat(Qt::PlainText);
   time_ = new QLabel;
   stop_ = new QPushButton(tr("&Stop"));
+  // No key that is meant for something else stops an engine.
+  stop_->setAutoDefault(false);
   row->addWidget(bar_);
   row->addWidget(text_, 1);
   row->addWidget(time_);
