@@ -102,6 +102,27 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
     return KeysCommand(typed.markdown, streams);
   })->add_flag("--markdown", typed.markdown, "As a page of the manual");
 
+  RunOptions runOptions;
+  CLI::App* runs = withFile(command("run", "Run a setup with its engine and wait for the end", [&] {
+    runOptions.file = typed.file;
+    runOptions.json = typed.json;
+    return RunCommand(runOptions, streams);
+  }));
+  runs->footer(
+      "What the engine says goes to the output, how it ended to the error stream. Ctrl-C stops the engine. Exit "
+      "status:\n"
+      "0 done, 1 the engine failed or was stopped, 2 not started.");
+  const auto part = [&](const char* name, const char* argument, const char* description) {
+    return runs->add_flag_callback(
+        name, [&runOptions, argument] { runOptions.argument = argument; }, description);
+  };
+  CLI::Option* preprocessor = part("--pp", "/PP", "The preprocessor alone, whatever the setup says");
+  CLI::Option* waterMovement = part("--wm", "/WM", "Water movement alone")->excludes(preprocessor);
+  part("--wq", "/WQ", "Water quality alone")->excludes(preprocessor)->excludes(waterMovement);
+  runs->add_option("--engines", runOptions.engines,
+                   "The folder of the engines; without it TERVANE_ENGINES, or engines/ beside the program");
+  runs->add_flag("--json", typed.json, "How it ended as JSON; what the engine says goes to the error stream");
+
   CLI::App* data =
       app.add_subcommand("data", "Look into data files (.nds0 to .nds3, netCDF) and rasters (GeoTIFF, ...)");
   data->require_subcommand(1);

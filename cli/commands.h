@@ -43,6 +43,16 @@ int SetCommand(const std::string& file, const std::string& path, const std::stri
 int DiffCommand(const std::string& from, const std::string& to, bool json, Streams streams);
 int KeysCommand(bool markdown, Streams streams);
 
+/// What `run` was asked for.
+struct RunOptions {
+  std::string file;
+  std::string argument;  ///< "/PP", "/WM", "/WQ", or empty: what the setup says.
+  std::string engines;   ///< Folders of engines; may be empty.
+  bool json = false;
+};
+/// Runs a setup and waits for the end: done, findings when the engine failed, could not when it was not started.
+int RunCommand(const RunOptions& options, Streams streams);
+
 /// What a data file holds, by its header alone.
 int DataInfoCommand(const std::string& path, bool json, Streams streams);
 /// The range, mean and missing values of each item; reads the whole file.

@@ -139,6 +139,10 @@ bool CYbSEDocument::OnSaveDocument(const std::string& path) {
   return true;
 }
 
+void CYbSEDocument::RunEnginePrg2(int showsProgress, const char* /*text*/, int, int, int, int) {
+  if (engineShell_) engineShell_->Start(launch_, showsProgress != 0);
+}
+
 std::string CYbSEDocument::getResultFolder() const {
   if (UseCustomResultFolder && !CustomResultFolder.IsEmpty()) return CustomResultFolder.Absolute();
   return ResolvedPath(fmt::format("{}_results", BaseNameOf(path_)), FolderOf(AbsoluteFromHere(path_)));

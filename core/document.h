@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "core/engine_shell.h"
 #include "core/node.h"
 
 namespace tervane {
@@ -70,12 +71,29 @@ class CYbSEDocument {
   /// The text of that file; empty with an error when it cannot be written.
   bool BuildText(const std::string& folder, std::string& text, std::string& error) const;
 
+  // ---- Engines. What is set for a start stays for the later ones.
+
+  /// The program that runs engines for this document, which outlives it; without one nothing runs.
+  void SetEngineShell(EngineShell* shell) { engineShell_ = shell; }
+  virtual void SetEngine(const std::string& fileName) { launch_.Engine = fileName; }
+  void SetInputName(const std::string& path) { launch_.Input = path; }
+  void SetExtraExecuteArgument(const std::string& options) { launch_.Options = options; }
+  void SetExtraLog(const std::string& path) { launch_.ExtraLog = path; }
+  /// Starts what was set. The first number tells whether a window shows the progress; the text and the other numbers
+  /// are of no meaning here.
+  void RunEnginePrg2(int showsProgress, const char* text, int, int, int, int);
+  /// Non-zero while an engine runs this document.
+  virtual int IsExecuting() const { return engineShell_ && engineShell_->IsExecuting() ? 1 : 0; }
+
   /// The folder of the results: the custom folder when it is in use, else BASENAME_results beside the setup.
   std::string getResultFolder() const;
   bool UseCustomResultFolder = false;
   FileName CustomResultFolder;
 
  protected:
+  EngineShell* GetEngineShell() const { return engineShell_; }
+  /// A file that the engine must leave; set anew for each start.
+  void SetReport(const std::string& path) { launch_.Report = path; }
   /// What a kind of document does when its tree has been read.
   virtual void OnLoaded() {}
   void AddToReport(LoadReport::Kind kind, std::string text) {
@@ -96,6 +114,8 @@ class CYbSEDocument {
   LoadReport report_;
   std::vector<std::string> saveNotes_;
   bool modified_ = false;
+  EngineShell* engineShell_ = nullptr;
+  CYbSimpleLaunch launch_;
 
   /// The file that was read.
   struct Original {

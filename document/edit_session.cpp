@@ -252,7 +252,7 @@ std::string EditSession::Autosave() {
   }
   const std::string& setup = Path().empty() ? formerPath_ : Path();
   std::string failure;
-  AutosaveContent content{{}, known_.hash, EditorProcess::This(), AutosaveText(failure)};
+  AutosaveContent content{{}, known_.hash, RunningProcess::This(), AutosaveText(failure)};
   if (!setup.empty()) content.setup = TextOfPath(fs::absolute(NativePath(setup)));
 
   const auto isOwn = [&](const std::string& place) {

@@ -2,14 +2,59 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "document/flow_model_document.h"
 
+#include <fmt/format.h>
+
+#include "execution/execute_flags.h"
 #include "platform/paths.h"
 #include "platform/text.h"
+#include "simspec/model_components.h"
+#include "simspec/river_files.h"
 
 namespace tervane {
 
 CFlowModelDoc::CFlowModelDoc() : CYbSEDocument(std::make_unique<CGlobal>()) { Root().Validate(); }
 
 void CFlowModelDoc::OnLoaded() { Root().Validate(); }
+
+// ---- Engines
+
+bool CFlowModelDoc::SaveForRun() {
+  EngineShell* shell = GetEngineShell();
+  if (!shell) return false;
+  if (!shell->HasChanges() || shell->DoFileSave()) return true;
+  shell->Outside().Tell("Unable to run setup: Failed to save specification file.", Host::Icon::Error);
+  return false;
+}
+
+void CFlowModelDoc::RunEngine(const std::string& argument) {
+  if (!SaveForRun()) return;
+  const bool isShiftHeld = GetEngineShell()->IsShiftHeld();
+  SetExtraExecuteArgument(argument);
+  SetEngine("Tvn_Simulation.exe");
+  SetInputName(PathName());
+  const auto* flags = Root().Important<CExecuteEngineFlagsKvf>("EXECUTE_ENGINE_FLAGS");
+  const bool preprocesses = argument.empty() ? flags && flags->PP != 0 : argument == "/PP";
+  SetReport(preprocesses ? ResolvedPath(PreprocessorReport(), {}) : std::string());
+  if (ModelCompOf(Root()).River) {
+    if (const auto* river = Root().Important<RiverFiles>("River")) {
+      const std::string file = river->GetFilename().Absolute();
+      if (!file.empty()) SetExtraLog(file.substr(0, file.size() - ExtensionOf(file).size()) + "FvrProgress.log");
+    }
+  }
+  RunEnginePrg2(isShiftHeld ? 0 : 1, "", 1, 1, 0, 0);
+}
+
+void CFlowModelDoc::RunExtraction(int engine, int selection) {
+  if (!SaveForRun()) return;
+  const bool isShiftHeld = GetEngineShell()->IsShiftHeld();
+  SetExtraExecuteArgument(fmt::format("/Engine {} /SelPostProc {}", engine, selection));
+  SetEngine("PTRetrieval_Launch.exe");
+  SetInputName(PathName());
+  SetReport({});
+  RunEnginePrg2(isShiftHeld ? 0 : 1, "", 0, 0, 0, 0);
+}
+
+// ---- Files
 
 std::string CFlowModelDoc::ResultFile(std::string_view stemEnd, std::string_view extension) const {
   return ResultFileName(getResultFolder(), std::string(BaseNameOf(PathName())) + std::string(stemEnd), extension);

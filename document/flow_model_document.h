@@ -19,6 +19,16 @@ class CFlowModelDoc : public CYbSEDocument {
   CGlobal& Global() const { return static_cast<CGlobal&>(Root()); }
   static constexpr std::string_view kEditorName = "Flow Model";
 
+  // ---- Engines. Both save first, so that a run begins with what the user sees; a save that fails is told, and nothing
+  // is started.
+
+  /// Runs the setup. Without an argument the engine does what the flags of the setup say, with "/PP", "/WM" or "/WQ"
+  /// that part alone.
+  void RunEngine(const std::string& argument);
+  /// Extracts from the results of particle tracking: pathlines (1) or registrations (0), of one extraction by its
+  /// number or of all (-1).
+  void RunExtraction(int engine, int selection);
+
   // ---- Files in the result folder, written with `\\` behind the folder as the engines expect them
 
   std::string PreprocessorReport() const { return ResultFile("_PreProcessed", ".kvf"); }
@@ -37,6 +47,7 @@ class CFlowModelDoc : public CYbSEDocument {
   void OnLoaded() override;
 
  private:
+  bool SaveForRun();
   std::string ResultFile(std::string_view stemEnd, std::string_view extension) const;
 };
 

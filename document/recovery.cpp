@@ -78,7 +78,7 @@ bool ReadAutosave(const std::string& path, AutosaveContent& content, std::string
     return false;
   }
   const std::string_view lines = text.substr(kFirstLine.size(), end + 1 - kFirstLine.size());
-  const std::optional<EditorProcess> process = ProcessOfLines(lines, kComment);
+  const std::optional<RunningProcess> process = ProcessOfLines(lines, kComment);
   if (!process) {
     error = fmt::format("{} does not tell who wrote it", path);
     return false;

@@ -11,8 +11,8 @@
 #include <string_view>
 #include <vector>
 
-#include "document/editor_process.h"
 #include "platform/files.h"
+#include "platform/running_process.h"
 
 namespace tervane {
 
@@ -35,10 +35,10 @@ bool DiscardRecovery(const Recovery& recovery, std::string& error);
 
 /// The content of an autosave.
 struct AutosaveContent {
-  std::string setup;      ///< Absolute; empty when it was never saved.
-  std::string basedOn;    ///< Hash of the file that was changed; empty when there was none.
-  EditorProcess process;  ///< Who wrote it.
-  std::string text;       ///< The setup.
+  std::string setup;       ///< Absolute; empty when it was never saved.
+  std::string basedOn;     ///< Hash of the file that was changed; empty when there was none.
+  RunningProcess process;  ///< Who wrote it.
+  std::string text;        ///< The setup.
 };
 
 /// False when it cannot be read or is no autosave (other programs, too, name their copies NAME~).

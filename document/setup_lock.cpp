@@ -115,7 +115,7 @@ std::string HolderSentence(const LockHolder& holder) {
   if (!holder.process)
     return fmt::format("somebody may have it open: {} cannot be understood ({}); remove that file when nobody has",
                        holder.file, holder.whyUnknown);
-  const EditorProcess& process = *holder.process;
+  const RunningProcess& process = *holder.process;
   if (process.IsThis()) return "it is open in another window already";
   std::string sentence = fmt::format("{} has it open on host {} (process {})",
                                      process.user.empty() ? "somebody" : process.user, process.host, process.process);
@@ -142,7 +142,7 @@ SetupLock::Outcome SetupLock::Take(const std::string& setup) {
   static std::atomic<unsigned> counter{0};
   const std::string path = LockFileOf(setup);
   // The number tells one lock of this process from another.
-  const std::string content = ProcessLines(EditorProcess::This()) + NamedLine("session", std::to_string(++counter));
+  const std::string content = ProcessLines(RunningProcess::This()) + NamedLine("session", std::to_string(++counter));
   // Again and again only while others take over the same stale lock at this moment.
   constexpr int kAttempts = 200;
   std::error_code error;

@@ -7,14 +7,14 @@
 #include <optional>
 #include <string>
 
-#include "document/editor_process.h"
+#include "platform/running_process.h"
 
 namespace tervane {
 
 /// Who has a setup open.
 struct LockHolder {
-  std::string file;                      ///< The lock.
-  std::optional<EditorProcess> process;  ///< Nothing where the lock does not tell: then `whyUnknown` does.
+  std::string file;                       ///< The lock.
+  std::optional<RunningProcess> process;  ///< Nothing where the lock does not tell: then `whyUnknown` does.
   std::string whyUnknown;
 };
 

@@ -5,8 +5,8 @@
 #include <fmt/format.h>
 
 #include "document/flow_model_document.h"
+#include "engine/engine_output.h"
 #include "engine/preprocessor.h"
-#include "engine/run_log.h"
 #include "execution/execute_flags.h"
 #include "simspec/model_components.h"
 
@@ -32,7 +32,7 @@ Tasks TasksOf(const std::string& option, const CFlowModelDoc& document) {
 }  // namespace
 
 EngineStatus RunEngineProgram(const std::vector<std::string>& arguments, std::ostream& out) {
-  RunLog log(out);
+  EngineOutput log(out);
   std::string setup, option;
   for (const std::string& argument : arguments) {
     const bool isOption = argument == "/PP" || argument == "/WM" || argument == "/WQ";

@@ -40,7 +40,7 @@ int ModelGridFile::Add(ModelGrid grid) {
   return static_cast<int>(grids_.size());
 }
 
-bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, RunLog& log) {
+bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, EngineOutput& log) {
   NewDataFile content;
   content.geometry = FileGeometryOf(domain.Geometry());
   content.hasTime = false;

@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "engine/run_log.h"
+#include "engine/engine_output.h"
 #include "platform/datafile.h"
 #include "platform/grid.h"
 
@@ -40,7 +40,7 @@ class ModelGridFile {
   int Add(ModelGrid grid);
   /// Makes one quantity after the other, puts it on the cells of the domain, and writes it. Outside the domain all is
   /// empty. False when one could not be made, which the log tells; then an old file stands.
-  bool Write(const CTvn2DOrthoRotatedGridData& domain, RunLog& log);
+  bool Write(const CTvn2DOrthoRotatedGridData& domain, EngineOutput& log);
 
  private:
   std::string path_;

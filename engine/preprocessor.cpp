@@ -78,7 +78,7 @@ FileResult MeanOfSteps(const std::string& path, int number, const CYbDateTime& s
 
 }  // namespace
 
-Preprocessor::Preprocessor(CFlowModelDoc& document, RunLog& log)
+Preprocessor::Preprocessor(CFlowModelDoc& document, EngineOutput& log)
     : document_(document),
       log_(log),
       catchment_(document.Root().Important<CCatchmentKvf>("CATCHMENT")),

@@ -7,9 +7,9 @@
 #include <vector>
 
 #include "document/flow_model_document.h"
+#include "engine/engine_output.h"
 #include "engine/model_grids.h"
 #include "engine/report.h"
-#include "engine/run_log.h"
 #include "platform/grid.h"
 #include "platform/grid_polygons.h"
 
@@ -35,7 +35,7 @@ struct ZoneSource {
 /// needs nothing.
 class Preprocessor {
  public:
-  Preprocessor(CFlowModelDoc& document, RunLog& log);
+  Preprocessor(CFlowModelDoc& document, EngineOutput& log);
 
   /// Leaves grids and report in the setup's result folder. False when something in use cannot be used, which the log
   /// tells; then the report of an earlier run stands.
@@ -62,7 +62,7 @@ class Preprocessor {
   std::string SummaryText() const;
 
   CFlowModelDoc& document_;
-  RunLog& log_;
+  EngineOutput& log_;
   const CCatchmentKvf* catchment_;
   const CSimPeriodKvf* period_;
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> domain_;

@@ -76,4 +76,27 @@ std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document) {
   return found;
 }
 
+SetupFinding FindingOf(const CYbSEDocument& document, const EngineMessage& message) {
+  const SetupPath path = ParseSetupPath(message.place);
+  CYbSEKvfBase* node = nullptr;
+  if (path.error.empty())
+    for (const PathStep& step : path.steps) {
+      CYbSEKvfBase* child = FindChild(node ? *node : document.Root(), step);
+      if (!child) break;
+      node = child;
+    }
+  const auto kind = message.isError ? SetupFinding::Kind::Error : SetupFinding::Kind::Warning;
+  SetupFinding finding{kind, {}, message.text, {}, "told by the engine"};
+  if (node) {
+    const std::string_view place = message.place;
+    const std::size_t key = path.key.name.empty() ? std::string::npos : place.rfind(':');
+    finding.path = place.substr(0, key);
+    finding.key = path.key.name;
+    finding.serial = node->Serial();
+  } else if (!message.place.empty()) {
+    finding.text = message.place + ": " + message.text;
+  }
+  return finding;
+}
+
 }  // namespace tervane

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "core/document.h"
+#include "execution/engine_line.h"
 
 namespace tervane {
 
@@ -30,5 +31,8 @@ std::string_view KindName(SetupFinding::Kind kind);
 
 /// What reading the file met, then the findings of the latest validation of all nodes, then what was not read.
 std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document);
+
+/// What an engine said of the setup. Where the setup has no such place, the text stands alone.
+SetupFinding FindingOf(const CYbSEDocument& document, const EngineMessage& message);
 
 }  // namespace tervane

@@ -95,6 +95,15 @@ File File::CreateNew(const std::string& path, Access, std::error_code& error) {
   return file;
 }
 
+File File::OpenOrCreate(const std::string& path, std::error_code& error) {
+  File file;
+  void* handle = CreateFileW(Wide(path).c_str(), GENERIC_READ | GENERIC_WRITE, kShareAll, nullptr, OPEN_ALWAYS,
+                             FILE_ATTRIBUTE_NORMAL, nullptr);
+  SetError(handle != INVALID_HANDLE_VALUE, error);
+  if (!error) file.handle_ = handle;
+  return file;
+}
+
 bool File::IsOpen() const { return handle_ != nullptr; }
 
 std::size_t File::Read(char* buffer, std::size_t size, std::error_code& error) {
@@ -113,6 +122,12 @@ void File::WriteAll(std::string_view bytes, std::error_code& error) {
     if (!error && done == 0) error = std::make_error_code(std::errc::io_error);
     bytes.remove_prefix(done);
   }
+}
+
+void File::Seek(std::uint64_t place, std::error_code& error) {
+  LARGE_INTEGER distance{};
+  distance.QuadPart = static_cast<LONGLONG>(place);
+  SetError(SetFilePointerEx(handle_, distance, nullptr, FILE_BEGIN), error);
 }
 
 void File::Flush(std::error_code& error) { SetError(FlushFileBuffers(handle_), error); }
@@ -224,6 +239,8 @@ std::string ProcessStartTime(std::uint32_t processId) {
   CloseHandle(process);
   return done ? std::to_string((std::uint64_t{start.dwHighDateTime} << 32) | start.dwLowDateTime) : std::string();
 }
+
+std::uint32_t ParentOf(std::uint32_t /*processId*/) { return 0; }
 
 std::string UserName() {
   wchar_t name[UNLEN + 1];
@@ -370,6 +387,12 @@ File File::CreateNew(const std::string& path, Access access, std::error_code& er
   return file;
 }
 
+File File::OpenOrCreate(const std::string& path, std::error_code& error) {
+  File file;
+  file.descriptor_ = Checked(error, [&] { return open(path.c_str(), O_RDWR | O_CREAT | O_NOCTTY | O_CLOEXEC, 0666); });
+  return file;
+}
+
 bool File::IsOpen() const { return descriptor_ >= 0; }
 
 std::size_t File::Read(char* buffer, std::size_t size, std::error_code& error) {
@@ -386,6 +409,10 @@ void File::WriteAll(std::string_view bytes, std::error_code& error) {
     if (error) return;
     bytes.remove_prefix(static_cast<std::size_t>(done));
   }
+}
+
+void File::Seek(std::uint64_t place, std::error_code& error) {
+  Checked(error, [&] { return lseek(descriptor_, static_cast<off_t>(place), SEEK_SET); });
 }
 
 void File::Flush(std::error_code& error) {
@@ -536,6 +563,11 @@ std::string ProcessStartTime(std::uint32_t processId) {
   std::string boot;
   std::ifstream("/proc/sys/kernel/random/boot_id") >> boot;
   return field.empty() ? std::string() : field + " " + boot;
+}
+
+std::uint32_t ParentOf(std::uint32_t processId) {
+  constexpr int kParent = 4;
+  return static_cast<std::uint32_t>(std::strtoul(StatusField(processId, kParent).c_str(), nullptr, 10));
 }
 
 std::string HostName() {

@@ -1,7 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// The only place that calls the operating system directly; each call has its counterpart for Windows.
+// The only place, beside platform/os_process.h, that calls the operating system directly; each call has its counterpart
+// for Windows.
 #pragma once
 
 #include <cstddef>
@@ -32,12 +33,16 @@ class File {
   /// Creates a file that must not exist yet, readable and writable as the process's mask allows, or by its owner only.
   enum class Access { AsMaskAllows, OwnerOnly };
   static File CreateNew(const std::string& path, Access access, std::error_code& error);
+  /// Opens for reading and writing what stands there, or creates an empty file.
+  static File OpenOrCreate(const std::string& path, std::error_code& error);
 
   bool IsOpen() const;
   /// Reads up to `size` bytes; 0 at the end. Interrupted reads go on.
   std::size_t Read(char* buffer, std::size_t size, std::error_code& error);
   /// Writes all bytes or reports why not. Interrupted and short writes go on.
   void WriteAll(std::string_view bytes, std::error_code& error);
+  /// The next read or write begins at this byte.
+  void Seek(std::uint64_t place, std::error_code& error);
   void Flush(std::error_code& error);
   void Close(std::error_code& error);
 
@@ -115,6 +120,8 @@ bool IsProcessAlive(std::uint32_t processId);
 /// When that process of this machine started, in a form to be compared alone; also different after the machine started
 /// anew. Tells a process from a later one with the same number. Empty where unknown.
 std::string ProcessStartTime(std::uint32_t processId);
+/// The process that started this one, or that has adopted it; 0 where unknown.
+std::uint32_t ParentOf(std::uint32_t processId);
 std::string HostName();
 /// The name under which the user is known to the system; empty where unknown.
 std::string UserName();

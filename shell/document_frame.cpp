@@ -17,6 +17,7 @@
 #include "pages/findings.h"
 #include "pages/page.h"
 #include "pages/tree_entries.h"
+#include "shell/document_run.h"
 #include "shell/find_panel.h"
 #include "shell/findings_view.h"
 #include "shell/form_dialog.h"
@@ -26,6 +27,7 @@
 #include "shell/program.h"
 #include "shell/qt_host.h"
 #include "shell/qt_text.h"
+#include "shell/run_panel.h"
 #include "shell/theme.h"
 
 namespace tervane {
@@ -36,6 +38,7 @@ constexpr int kTreeWidth = 250, kPageWidth = 750, kPageHeight = 480, kBottomHeig
 constexpr int kAutosaveDelay = 2000;      ///< Milliseconds after the last change.
 constexpr int kDiskInterval = 3000;       ///< Milliseconds between looks at the file on disk.
 constexpr int kProcessedInterval = 1000;  ///< The same at the preprocessor's report.
+constexpr int kFindingsDelay = 300;       ///< Milliseconds for which messages of an engine gather.
 constexpr std::size_t kMostVisited = 200;
 
 CYbSEKvfBase* NodeBelow(CYbSEKvfBase& node, std::uint64_t serial) {
@@ -52,7 +55,9 @@ DocumentFrame::DocumentFrame(std::unique_ptr<EditSession> session, const QString
   all_ = new QVBoxLayout(this);
   all_->setContentsMargins(0, 0, 0, 0);
   all_->setSpacing(0);
+  run_ = std::make_unique<DocumentRun>(*session_, host_, this);
   BuildBody();
+  FollowRun();
   session_->Listen([this](int hint) { Refresh(hint); });
   autosave_.setSingleShot(true);
   connect(&autosave_, &QTimer::timeout, this, &DocumentFrame::RunAutosave);
@@ -69,6 +74,7 @@ DocumentFrame::DocumentFrame(std::unique_ptr<EditSession> session, const QString
     ShowBanner(tr("Read-only: %1.").arg(ToQt(session_->ReadOnlyReason())),
                {{tr("Save &As…"), [this] { emit SaveAsWanted(); }}});
   TellReport();
+  run_->FindRun();
 }
 
 DocumentFrame::~DocumentFrame() {
@@ -107,14 +113,22 @@ void DocumentFrame::BuildBody() {
   connect(findings_, &FindingsView::FindingChosen, this,
           [this](const SetupFinding& finding) { GoTo(finding.serial, finding.key); });
   bottomTabs_->addTab(findings_, tr("Findings"));
-  log_ = new LogView(tr("What happens to this document, and what an engine that runs it says, stands here."));
+  log_ =
+      new LogView(run_->Log(), tr("What happens to this document, and what an engine that runs it says, stands here."));
+  log_->SetFile([this] { return run_->LogFile(); });
   bottomTabs_->addTab(log_, tr("Execution Log"));
-  bottomTabs_->addTab(new LogView(tr("What the river engine says during a run stands here.")),
-                      tr("Fluvane Execution Log"));
+  riverLog_ = new LogView(run_->RiverLog(), tr("What the river engine says during a run stands here."));
+  bottomTabs_->addTab(riverLog_, tr("Fluvane Execution Log"));
+  auto* bottom = new QWidget;
+  auto* below = new QVBoxLayout(bottom);
+  below->setContentsMargins(0, 0, 0, 0);
+  below->setSpacing(0);
+  below->addWidget(bottomTabs_, 1);
+  below->addWidget(new RunPanel(*run_));
 
   rows_ = new QSplitter(Qt::Vertical);
   rows_->addWidget(pagePlace_);
-  rows_->addWidget(bottomTabs_);
+  rows_->addWidget(bottom);
   rows_->setStretchFactor(0, 1);
   rows_->setSizes({theme.Scaled(kPageHeight), theme.Scaled(kBottomHeight)});
   rows_->setChildrenCollapsible(false);
@@ -130,14 +144,12 @@ void DocumentFrame::BuildBody() {
 void DocumentFrame::Redraw() {
   Commit();
   const QByteArray layout = SaveLayout();
-  const QString log = log_->toPlainText();
   const std::uint64_t current = current_;
   const int tab = treeTabs_->currentIndex(), bottom = bottomTabs_->currentIndex();
   delete columns_;
   current_ = 0;
   BuildBody();
   RestoreLayout(layout);
-  log_->setPlainText(log);
   treeTabs_->setCurrentIndex(tab);
   bottomTabs_->setCurrentIndex(bottom);
   Refresh(kDataChanged);
@@ -340,15 +352,73 @@ void DocumentFrame::Refresh(int hint) {
   CGlobal& root = session_->Document().Global();
   const auto* settings = root.Important<CViewSettingsKvf>("VIEWSETTINGS");
   for (NodeTree* tree : trees_) tree->Sync(root, !settings || settings->ShowValidationIcons != 0);
-  findings_->Show(FindingsOf(session_->Document()));
-  const int count = findings_->Count();
-  bottomTabs_->setTabText(bottomTabs_->indexOf(findings_), count ? tr("Findings (%1)").arg(count) : tr("Findings"));
+  ShowFindings();
   if (page_) LeaveGoneNode();
   if (page_) page_->Sync();
   if (hint & ~(kDataChanged | kRefreshPlots)) find_->Forget();
   if (session_->NeedsAutosave()) autosave_.start(kAutosaveDelay);
   emit StateChanged();
 }
+
+void DocumentFrame::ShowFindings() {
+  findingsLater_.stop();
+  std::vector<SetupFinding> findings = FindingsOf(session_->Document());
+  for (const EngineMessage& message : run_->Messages()) {
+    SetupFinding finding = FindingOf(session_->Document(), message);
+    // An engine checks what the editor checks too.
+    const bool isKnown = std::ranges::any_of(findings, [&](const SetupFinding& known) {
+      return known.path == finding.path && known.key == finding.key && known.text == finding.text;
+    });
+    if (!isKnown) findings.push_back(std::move(finding));
+  }
+  findings_->Show(std::move(findings));
+  const int count = findings_->Count();
+  bottomTabs_->setTabText(bottomTabs_->indexOf(findings_), count ? tr("Findings (%1)").arg(count) : tr("Findings"));
+}
+
+// ---- The run
+
+void DocumentFrame::FollowRun() {
+  findingsLater_.setSingleShot(true);
+  findingsLater_.setInterval(kFindingsDelay);
+  connect(&findingsLater_, &QTimer::timeout, this, &DocumentFrame::ShowFindings);
+  connect(run_.get(), &DocumentRun::Begun, this, [this] {
+    bottomTabs_->setCurrentWidget(log_);
+    riverLog_->Follow();
+    emit StateChanged();
+  });
+  connect(run_.get(), &DocumentRun::Moved, this, [this] {
+    log_->Follow();
+    riverLog_->Follow();
+  });
+  connect(run_.get(), &DocumentRun::MessagesCame, this, [this] {
+    if (!findingsLater_.isActive()) findingsLater_.start();
+  });
+  connect(run_.get(), &DocumentRun::Ended, this, &DocumentFrame::TellRunEnd);
+}
+
+void DocumentFrame::TellRunEnd(bool isDone, bool wasFound) {
+  ShowFindings();
+  delete runBanner_;
+  QString text = run_->Sentence();
+  if (wasFound) text = tr("A run of this setup that was not started here: %1").arg(text);
+  std::vector<Banner::Answer> answers{{tr("Show the &Log"), [this] { bottomTabs_->setCurrentWidget(log_); }}};
+  if (!isDone && !run_->Messages().empty())
+    answers.push_back({tr("Show the &Findings"), [this] { bottomTabs_->setCurrentWidget(findings_); }});
+  runBanner_ = new Banner(text, answers);
+  all_->insertWidget(0, runBanner_);
+  QApplication::alert(this);
+  CheckProcessedData();
+  emit StateChanged();
+  emit RunEnded();
+}
+
+void DocumentFrame::Settle() {
+  run_->Settle();
+  ShowFindings();
+}
+
+// ---- Editing
 
 void DocumentFrame::RefreshPlots() {
   Commit();
@@ -415,6 +485,7 @@ void DocumentFrame::TellReport() {
 }
 
 void DocumentFrame::CheckDisk() {
+  run_->FindRun();
   if (diskBanner_ || session_->Path().empty()) return;
   const EditSession::OnDisk state = session_->CheckDisk();
   if (state == EditSession::OnDisk::AsKnown) return;
@@ -437,7 +508,7 @@ void DocumentFrame::RunAutosave() {
     Log(tr("The changes could not be kept for a recovery: %1").arg(ToQt(trouble)));
 }
 
-void DocumentFrame::Log(const QString& line) { log_->Add(line); }
+void DocumentFrame::Log(const QString& line) { run_->AddToLog(line); }
 
 QByteArray DocumentFrame::SaveLayout() const {
   QByteArray layout;

@@ -19,6 +19,7 @@ class QVBoxLayout;
 
 namespace tervane {
 
+class DocumentRun;
 class FindPanel;
 class FindingsView;
 class LogView;
@@ -37,6 +38,8 @@ class DocumentFrame : public QWidget {
   ~DocumentFrame() override;
 
   EditSession& Session() const { return *session_; }
+  /// The engine that runs the setup.
+  DocumentRun& Run() const { return *run_; }
   /// The name of the file, with a star when there are changes to save.
   QString Title() const;
   QString Name() const;
@@ -80,6 +83,9 @@ class DocumentFrame : public QWidget {
   /// Makes all anew that was computed from colours and sizes.
   void Redraw();
 
+  /// Waits until what is known of a run is shown; for pictures.
+  void Settle();
+
   QByteArray SaveLayout() const;
   void RestoreLayout(const QByteArray& layout);
 
@@ -91,6 +97,8 @@ class DocumentFrame : public QWidget {
   void ChangesWanted();
   /// A data file is to be shown in a viewer.
   void DataFileWanted(const QString& path);
+  /// An engine that ran the setup has ended: what it leaves in the result folder is to be read anew.
+  void RunEnded();
 
  private:
   void BuildBody();
@@ -107,6 +115,9 @@ class DocumentFrame : public QWidget {
   void LeaveGoneNode();
   void RunAutosave();
   void TellReport();
+  void FollowRun();
+  void ShowFindings();
+  void TellRunEnd(bool isDone, bool wasFound);
 
   std::unique_ptr<EditSession> session_;
   QString name_;
@@ -122,10 +133,11 @@ class DocumentFrame : public QWidget {
   std::vector<NodeTree*> trees_;
   FindPanel* find_ = nullptr;
   FindingsView* findings_ = nullptr;
-  LogView* log_ = nullptr;
+  std::unique_ptr<DocumentRun> run_;
+  LogView *log_ = nullptr, *riverLog_ = nullptr;
   QWidget* pagePlace_ = nullptr;
   QPointer<PageView> page_;
-  QPointer<Banner> diskBanner_;
+  QPointer<Banner> diskBanner_, runBanner_;
 
   std::uint64_t current_ = 0;
   std::vector<std::uint64_t> above_;    ///< The nodes above the one that is shown, nearest first.
@@ -136,7 +148,7 @@ class DocumentFrame : public QWidget {
   std::string lostPage_;  ///< The path of a page of processed data that a rebuild took away, until another is chosen.
   std::string toldProblem_;  ///< Of the report, as the log has it.
   bool isReportGone_ = false;
-  QTimer autosave_, disk_, processed_;
+  QTimer autosave_, disk_, processed_, findingsLater_;
 };
 
 }  // namespace tervane

@@ -93,6 +93,7 @@ int Run(const Typed& typed, QApplication& application) {
     QTimer::singleShot(0, &window, [&window] { window.OfferRecoveries(); });
     return QApplication::exec();
   }
+  if (window.Frame()) window.Frame()->Settle();
   // Layouts settle when events have run, and maps when they are computed.
   for (int i = 0; i < 3; ++i) application.processEvents();
   const auto isBusy = [&window] {

@@ -5,6 +5,7 @@
 #include <QActionGroup>
 #include <QApplication>
 #include <QClipboard>
+#include <QFileDialog>
 #include <QFileInfo>
 #include <QLabel>
 #include <QMenuBar>
@@ -17,8 +18,10 @@
 #include "document/edit_session.h"
 #include "document/module.h"
 #include "document/view_settings.h"
+#include "execution/engine_search.h"
 #include "execution/execute_flags.h"
 #include "shell/document_frame.h"
+#include "shell/document_run.h"
 #include "shell/main_window.h"
 #include "shell/program.h"
 #include "shell/qt_text.h"
@@ -223,13 +226,25 @@ void MainWindow::BuildRunMenu() {
   quality.enabled = [this] { return Frame() && HasWaterQuality(*Frame()); };
   quality.checked = [this] { return Frame() && HasWaterQuality(*Frame()) && FlagsOf(*Frame()).WQ != 0; };
   run->addSeparator();
-  AddForDocument(run, tr("Execute..."), nullptr, {}, [this](DocumentFrame& frame) { RunEngine(frame, {}); });
+  const auto execute = [](DocumentFrame& frame, const char* argument) {
+    frame.Session().Document().RunEngine(argument);
+  };
+  Command& all = AddForDocument(run, tr("Execute..."), nullptr, {}, [=](DocumentFrame& frame) { execute(frame, ""); });
+  all.enabled = [this] { return Frame() && Frame()->Session().Document().IsExecuting() == 0; };
+  const auto whileExecuting = [&](const QString& text, void (DocumentRun::*operation)()) {
+    Command& command =
+        AddForDocument(run, text, nullptr, {}, [operation](DocumentFrame& frame) { (frame.Run().*operation)(); });
+    command.enabled = [this] { return Frame() && Frame()->Run().IsExecuting(); };
+  };
+  whileExecuting(tr("&Stop…"), &DocumentRun::Stop);
+  whileExecuting(tr("S&how Progress"), &DocumentRun::ShowProgress);
+  run->addSeparator();
+  Add(run, tr("Folder of the &Engines…"), nullptr, {}, [this] { ChooseEngineFolder(); });
 
   modelBar_->addAction(refresh.action);
   modelBar_->addSeparator();
-  const auto button = [&](const QString& text, const char* icon, const QString& argument) {
-    Command& command =
-        AddForDocument(nullptr, text, icon, {}, [this, argument](DocumentFrame& frame) { RunEngine(frame, argument); });
+  const auto button = [&](const QString& text, const char* icon, const char* argument) {
+    Command& command = AddForDocument(nullptr, text, icon, {}, [=](DocumentFrame& frame) { execute(frame, argument); });
     modelBar_->addAction(command.action);
   };
   button(tr("Run preprocessor only"), "run_preprocessor", "/PP");
@@ -244,16 +259,10 @@ void MainWindow::ToggleFlag(DocumentFrame& frame, int CExecuteEngineFlagsKvf::*f
   frame.Change(flags, kDataChanged, tr("Change %1").arg(action));
 }
 
-void MainWindow::RunEngine(DocumentFrame& frame, const QString& argument) {
-  if (frame.Session().IsModified() && !SaveDocument()) {
-    host_.Tell("Unable to run setup: Failed to save specification file.", Host::Icon::Error);
-    return;
-  }
-  const QString command = QString("Tvn_Simulation \"%1\" %2").arg(ToQt(frame.Session().Path()), argument).trimmed();
-  host_.Tell(
-      FromQt(tr("This version of the editor does not start engines itself. The setup is saved; run it with\n\n%1")
-                 .arg(command)),
-      Host::Icon::Information);
+void MainWindow::ChooseEngineFolder() {
+  const QString current = program_.Settings().value(kEnginePathSetting).toString();
+  const QString folder = QFileDialog::getExistingDirectory(this, tr("Folder of the Engines"), current);
+  if (!folder.isEmpty()) program_.Settings().setValue(kEnginePathSetting, folder);
 }
 
 void MainWindow::BuildHelpMenu() {

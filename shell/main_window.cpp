@@ -22,6 +22,7 @@
 #include "shell/changes_dialog.h"
 #include "shell/data_viewer.h"
 #include "shell/document_frame.h"
+#include "shell/document_run.h"
 #include "shell/program.h"
 #include "shell/qt_text.h"
 #include "shell/theme.h"
@@ -79,6 +80,10 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   if (!isNew) program_.AddRecentFile(ToQt(session->Path()));
   auto* frame = new DocumentFrame(std::move(session), name, host_, program_);
   frame->RestoreLayout(program_.Settings().value(kFrameLayout).toByteArray());
+  frame->Run().SetSaver([this, frame] {
+    tabs_->setCurrentWidget(frame);
+    return SaveDocument();
+  });
   connect(frame, &DocumentFrame::StateChanged, this, &MainWindow::SyncCommands);
   connect(frame, &DocumentFrame::SaveAsWanted, this, &MainWindow::SaveDocumentAs);
   connect(
@@ -233,6 +238,12 @@ bool MainWindow::CloseDocument(DocumentFrame* frame) {
     if (answer == QMessageBox::Save && !SaveDocument()) return false;
     if (answer != QMessageBox::Save && answer != QMessageBox::Discard) return false;
   }
+  if (frame->Run().IsExecuting() &&
+      host_.Ask(FromQt(tr("An engine runs %1. Close the setup and let the engine run on? How it ended is told when the "
+                          "setup is opened again.")
+                           .arg(frame->Name())),
+                Host::Icon::Question, Host::Buttons::YesNo) != Host::Answer::Yes)
+    return false;
   program_.Settings().setValue(kFrameLayout, frame->SaveLayout());
   delete frame;
   SyncCommands();

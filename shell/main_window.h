@@ -80,7 +80,7 @@ class MainWindow : public QMainWindow {
   void ShowChanges(DocumentFrame& frame);
   void CopyToKeyboardWidget(const char* operation);
   void ToggleFlag(DocumentFrame& frame, int CExecuteEngineFlagsKvf::*flag, const QString& action);
-  void RunEngine(DocumentFrame& frame, const QString& argument);
+  void ChooseEngineFolder();
   void SetZoom(double zoom);
   void Restyle();
 

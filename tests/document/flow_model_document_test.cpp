@@ -4,8 +4,11 @@
 
 #include <filesystem>
 
+#include <fmt/format.h>
 #include <gmock/gmock.h>
 
+#include "simspec/model_components.h"
+#include "simspec/river_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -20,6 +23,38 @@ using test::ValueOf;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
+
+/// A program that notes what it is asked to start.
+class NotingShell : public EngineShell, public NobodyToAsk {
+ public:
+  bool hasChanges = false, canSave = true, isShiftHeld = false;
+  std::vector<std::string> notes;
+
+  Host& Outside() override { return *this; }
+  Answer Ask(const std::string& text, Icon /*icon*/, Buttons /*buttons*/) override {
+    notes.push_back("told: " + text);
+    return Answer::Ok;
+  }
+  bool HasChanges() const override { return hasChanges; }
+  bool DoFileSave() override {
+    notes.push_back("save");
+    return canSave;
+  }
+  bool IsShiftHeld() const override { return isShiftHeld; }
+  void Start(const CYbSimpleLaunch& launch, bool showsProgress) override {
+    notes.push_back(fmt::format("{} {} [{}] log [{}] report [{}]{}", launch.Engine, launch.Input, launch.Options,
+                                launch.ExtraLog, launch.Report, showsProgress ? "" : " hidden"));
+  }
+  bool IsExecuting() const override { return !notes.empty(); }
+};
+
+/// The node that names the river simulation.
+class River : public CTvnKvfBase, public RiverFiles {
+ public:
+  explicit River(CYbSEKvfBase* parent) : CTvnKvfBase("River", "River", parent) {}
+  FileName file{"rivers/karup.fvsim", "/data"};
+  const FileName& GetFilename() const override { return file; }
+};
 
 class FlowModelDocument : public testing::Test {
  public:
@@ -48,6 +83,41 @@ TEST_F(FlowModelDocument, NamesTheFilesThatLieInTheResultFolder) {
   EXPECT_EQ(ResultFileName("C:\\x\\results\\", "run", "tvdres"), "C:\\x\\results\\run.tvdres");
   EXPECT_EQ(ResultFileName("  /data/out/  ", "run", ""), "\\data\\out\\run");
   EXPECT_EQ(ResultFileName("", "run", ".fif"), "\\run.fif");
+}
+
+TEST_F(FlowModelDocument, RunsTheEngineOnTheSavedFile) {
+  ASSERT_TRUE(
+      document.OpenText(SetupText(14, "section SimSpec {\nsection ModelComp {\nRiver = 1\n}\n}"), "/data/karup.tvd"));
+  document.RunEngine("");  // nobody there
+  EXPECT_EQ(document.IsExecuting(), 0);
+  NotingShell shell;
+  document.SetEngineShell(&shell);
+  document.RunEngine("/WM");
+  EXPECT_NE(document.IsExecuting(), 0);
+  auto* river = document.Root().NewChild<River>();
+  document.Root().RegisterImportantNode(river, "River");
+  shell.isShiftHeld = true;
+  shell.hasChanges = true;
+  document.RunEngine("");
+  shell.isShiftHeld = false;
+  // The log of an earlier start stays.
+  river->file = FileName("other.fvsim", "/data");
+  document.Root().Important<CModelCompKvf>("MODELCOMP")->River = 0;
+  document.RunEngine("/PP");
+  document.RunExtraction(1, -1);
+  shell.canSave = false;
+  document.RunEngine("");
+  EXPECT_THAT(shell.notes,
+              ElementsAre("Tvn_Simulation.exe /data/karup.tvd [/WM] log [] report []", "save",
+                          "Tvn_Simulation.exe /data/karup.tvd [] log [/data/rivers/karupFvrProgress.log] report "
+                          "[/data/karup_results/karup_PreProcessed.kvf] hidden",
+                          "save",
+                          "Tvn_Simulation.exe /data/karup.tvd [/PP] log [/data/rivers/karupFvrProgress.log] report "
+                          "[/data/karup_results/karup_PreProcessed.kvf]",
+                          "save",
+                          "PTRetrieval_Launch.exe /data/karup.tvd [/Engine 1 /SelPostProc -1] log "
+                          "[/data/rivers/karupFvrProgress.log] report []",
+                          "save", "told: Unable to run setup: Failed to save specification file."));
 }
 
 TEST_F(FlowModelDocument, KeepsTheCustomResultFolderInTheFile) {

@@ -21,8 +21,8 @@ using test::SetupText;
 using test::TempFolder;
 
 /// Of this host, and ended before this process began.
-EditorProcess Ended() {
-  EditorProcess process = EditorProcess::This();
+RunningProcess Ended() {
+  RunningProcess process = RunningProcess::This();
   process.started = "an earlier start";
   return process;
 }
@@ -34,7 +34,7 @@ class RecoveryTest : public testing::Test {
   std::string kept = folder.File("kept");
   RecoveryTest() { fs::create_directory(kept); }
 
-  void Keep(const std::string& path, const std::string& of, const EditorProcess& by,
+  void Keep(const std::string& path, const std::string& of, const RunningProcess& by,
             const std::string& text = "changed") {
     EXPECT_EQ(WriteAutosave(path, {of, "", by, text}).error, "");
   }
@@ -63,18 +63,18 @@ TEST_F(RecoveryTest, OnlyWhatNoFileHoldsAndNoEditorIsWorkingOnIsOffered) {
   CFlowModelDoc document;
   const std::string old = folder.Write("old.tvd", ReadFile(TERVANE_SOURCE_DIR "/examples/old/version_10.tvd"));
   ASSERT_TRUE(document.OnOpenDocument(old));
-  EditorProcess elsewhere = Ended();
+  RunningProcess elsewhere = Ended();
   elsewhere.host = "gauss.x";
   struct Case {
     const char* what;
     std::string setup;
-    EditorProcess by;
+    RunningProcess by;
     std::string text;
     bool isOffered;
   };
   const Case cases[] = {
       {"changes of an editor that ended", setup, Ended(), "changed", true},
-      {"a living editor's", setup, EditorProcess::This(), "changed", false},
+      {"a living editor's", setup, RunningProcess::This(), "changed", false},
       {"the file as it is", setup, Ended(), SetupText(14, ""), false},
       {"the file as a save would write it", old, Ended(), SavedText(document), false},
       {"no setup of its own any more", folder.File("gone.tvd"), Ended(), SavedText(document), true},
@@ -89,7 +89,7 @@ TEST_F(RecoveryTest, OnlyWhatNoFileHoldsAndNoEditorIsWorkingOnIsOffered) {
     EXPECT_EQ(found ? found->setup : c.setup, c.setup);
     // What is offered waits for its user; what may be in use is its editor's.
     EXPECT_EQ(MayReplaceAutosave(AutosaveBeside(c.setup), c.setup),
-              !c.isOffered && c.by.started != EditorProcess::This().started);
+              !c.isOffered && c.by.started != RunningProcess::This().started);
     fs::remove(AutosaveBeside(c.setup));
   }
   Keep(AutosaveBeside(setup), setup, elsewhere);
@@ -115,7 +115,7 @@ TEST_F(RecoveryTest, TheFolderIsSearchedAndTheNewestComesFirst) {
     fs::last_write_time(names[i], fs::file_time_type::clock::now() - std::chrono::hours(3 - i));
   }
   const std::string second = NewAutosaveName("", kept);
-  Keep(second, "", EditorProcess::This());
+  Keep(second, "", RunningProcess::This());
   CFlowModelDoc untouched;
   Keep(NewAutosaveName("", kept), "", Ended(), SavedText(untouched));
   folder.Write("kept/notes.tvd~", "mine");

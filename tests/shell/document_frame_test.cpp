@@ -12,9 +12,9 @@
 
 #include <gmock/gmock.h>
 
+#include "shell/document_run.h"
 #include "shell/find_panel.h"
 #include "shell/findings_view.h"
-#include "shell/log_view.h"
 #include "shell/map_canvas.h"
 #include "shell/node_tree.h"
 #include "shell/series_plot.h"
@@ -118,7 +118,8 @@ class PreprocessedSetup : public OpenedSetup {
   void GoToPage(const std::string& path) { GoTo("ProcData/Preprocessed data/" + path); }
   std::string Log() {
     std::string text;
-    for (const LogView* log : Frame().findChildren<LogView*>()) text += FromQt(log->toPlainText());
+    const LogTail& log = Frame().Run().Log();
+    for (std::size_t i = 0; i < log.Count(); ++i) text += std::string(log.Line(i)) + "\n";
     return text;
   }
   /// The widget of that class that the page shows.

@@ -3,44 +3,21 @@
 #include "shell/main_window.h"
 
 #include <QDir>
-#include <QMessageBox>
 #include <QPushButton>
 #include <QTabWidget>
-#include <QTimer>
 
 #include <gmock/gmock.h>
 
 #include "shell/theme.h"
+#include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
 
 namespace tervane {
 namespace {
 
+using test::NextAnswer;
 using test::OpenedSetup;
 using testing::HasSubstr;
-
-/// Answers the next message box with the button of that text, and keeps what it said.
-class NextAnswer {
- public:
-  explicit NextAnswer(const QString& button) {
-    timer_.setInterval(5);
-    QObject::connect(&timer_, &QTimer::timeout, [this, button] {
-      auto* box = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
-      if (!box) return;
-      text_ = FromQt(box->text());
-      for (QAbstractButton* each : box->buttons())
-        if (QString(each->text()).remove('&') == button) return each->click();
-      ADD_FAILURE() << "no button " << FromQt(button) << " under: " << text_;
-      box->reject();
-    });
-    timer_.start();
-  }
-  const std::string& Text() const { return text_; }
-
- private:
-  QTimer timer_;
-  std::string text_;
-};
 
 QPushButton* ReloadButton(OpenedSetup& setup) {
   for (QPushButton* button : setup.Frame().findChildren<QPushButton*>())
@@ -160,7 +137,7 @@ TEST(MainWindow, WhatACrashLeftIsOfferedOnlyWhileItsSetupIsOpenNowhere) {
   ASSERT_TRUE(QDir().mkpath(ToQt(folder)));
   AutosaveContent content;
   content.setup = setup.Path();
-  content.process = EditorProcess::This();
+  content.process = RunningProcess::This();
   content.process.started = "earlier";
   content.text = test::SetupText(14, "section SimSpec {\nsection SimTitle {\nTitle = \"left\"\n}\n}");
   ASSERT_TRUE(WriteAutosave(NewAutosaveName(setup.Path(), folder), content).Ok());

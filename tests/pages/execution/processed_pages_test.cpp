@@ -142,7 +142,7 @@ TEST(ProcessedPages, ALayerIsChosenFromTheTopAndChangesNothingOfTheSetup) {
     return static_cast<Control*>(nullptr);
   };
   Control& layer = *control(ControlKind::Choice);
-  const auto middle = [&] { return control(ControlKind::Map)->map().grids.front().grid->Value(24, 18); };
+  const auto middle = [&] { return Finished(control(ControlKind::Map)->map).grids.front().grid->Value(24, 18); };
   EXPECT_THAT(layer.Options(), ElementsAre("Computational Layer 1", "Computational Layer 2", "Computational Layer 3"));
   EXPECT_NEAR(middle(), -30, 1);
   int hints = -1;

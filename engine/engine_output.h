@@ -11,9 +11,9 @@ namespace tervane {
 
 /// What an engine prints, a line at a time, each passed on at once. Whoever started it makes findings of its errors and
 /// warnings, and moves a bar by its progress.
-class RunLog {
+class EngineOutput {
  public:
-  explicit RunLog(std::ostream& out) : out_(out) {}
+  explicit EngineOutput(std::ostream& out) : out_(out) {}
 
   void Line(std::string_view text);
   /// `percent` of the whole run.

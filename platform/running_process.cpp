@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "document/editor_process.h"
+#include "platform/running_process.h"
 
 #include <algorithm>
 #include <charconv>
@@ -11,16 +11,16 @@
 
 namespace tervane {
 
-EditorProcess EditorProcess::This() {
+RunningProcess RunningProcess::This() {
   const std::uint32_t process = os::ProcessId();
   return {os::UserName(), os::HostName(), process, os::ProcessStartTime(process)};
 }
 
-bool EditorProcess::IsOnThisHost() const { return host == os::HostName(); }
+bool RunningProcess::IsOnThisHost() const { return host == os::HostName(); }
 
-bool EditorProcess::IsThis() const { return IsOnThisHost() && process == os::ProcessId() && MayRun(); }
+bool RunningProcess::IsThis() const { return IsOnThisHost() && process == os::ProcessId() && MayRun(); }
 
-bool EditorProcess::MayRun() const {
+bool RunningProcess::MayRun() const {
   if (!IsOnThisHost()) return true;
   if (!os::IsProcessAlive(process)) return false;
   const std::string now = os::ProcessStartTime(process);
@@ -60,18 +60,18 @@ std::optional<std::string> NamedValue(std::string_view lines, std::string_view n
   return std::nullopt;
 }
 
-std::string ProcessLines(const EditorProcess& process, const std::string& prefix) {
+std::string ProcessLines(const RunningProcess& process, const std::string& prefix) {
   return NamedLine(prefix + "user", process.user) + NamedLine(prefix + "host", process.host) +
          NamedLine(prefix + "process", std::to_string(process.process)) +
          NamedLine(prefix + "started", process.started);
 }
 
-std::optional<EditorProcess> ProcessOfLines(std::string_view lines, const std::string& prefix) {
+std::optional<RunningProcess> ProcessOfLines(std::string_view lines, const std::string& prefix) {
   const std::optional<std::string> host = NamedValue(lines, prefix + "host");
   const std::optional<std::string> number = NamedValue(lines, prefix + "process");
   if (!host || !number) return std::nullopt;
-  EditorProcess process{NamedValue(lines, prefix + "user").value_or(""), *host, 0,
-                        NamedValue(lines, prefix + "started").value_or("")};
+  RunningProcess process{NamedValue(lines, prefix + "user").value_or(""), *host, 0,
+                         NamedValue(lines, prefix + "started").value_or("")};
   const char* end = number->data() + number->size();
   const std::from_chars_result read = std::from_chars(number->data(), end, process.process);
   if (read.ec != std::errc() || read.ptr != end) return std::nullopt;

@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "engine/run_log.h"
+#include "engine/engine_output.h"
 
 #include <fmt/format.h>
 
@@ -14,16 +14,18 @@ std::string WithPlace(std::string_view place, std::string_view text) {
 
 }  // namespace
 
-void RunLog::Line(std::string_view text) { out_ << text << '\n' << std::flush; }
+void EngineOutput::Line(std::string_view text) { out_ << text << '\n' << std::flush; }
 
-void RunLog::Progress(int percent, std::string_view doing) { Line(fmt::format("progress {} {}", percent, doing)); }
+void EngineOutput::Progress(int percent, std::string_view doing) {
+  Line(fmt::format("progress {} {}", percent, doing));
+}
 
-void RunLog::Error(std::string_view place, std::string_view text) {
+void EngineOutput::Error(std::string_view place, std::string_view text) {
   ++errors_;
   Line("error: " + WithPlace(place, text));
 }
 
-void RunLog::Warning(std::string_view place, std::string_view text) {
+void EngineOutput::Warning(std::string_view place, std::string_view text) {
   warnings_.push_back(WithPlace(place, text));
   Line("warning: " + warnings_.back());
 }

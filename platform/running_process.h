@@ -1,7 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// Who wrote a lock or an autosave, as lines that a person can read in the file.
+// Programs that run, as lines that a person can read in a lock, an autosave or the state of a run.
 #pragma once
 
 #include <cstdint>
@@ -12,13 +12,13 @@
 namespace tervane {
 
 /// A running program: of a user, on a host, with a number that is told from later ones by the time of its start.
-struct EditorProcess {
+struct RunningProcess {
   std::string user;
   std::string host;
   std::uint32_t process = 0;
   std::string started;
 
-  static EditorProcess This();
+  static RunningProcess This();
   bool IsOnThisHost() const;
   bool IsThis() const;
   /// False when it runs no more; of another host nobody knows, and it counts as running.
@@ -31,7 +31,7 @@ std::string NamedLine(std::string_view name, std::string_view value);
 std::optional<std::string> NamedValue(std::string_view lines, std::string_view name);
 
 /// The process as such lines, each name behind `prefix`; and back, nothing when host and process do not stand there.
-std::string ProcessLines(const EditorProcess& process, const std::string& prefix = {});
-std::optional<EditorProcess> ProcessOfLines(std::string_view lines, const std::string& prefix = {});
+std::string ProcessLines(const RunningProcess& process, const std::string& prefix = {});
+std::optional<RunningProcess> ProcessOfLines(std::string_view lines, const std::string& prefix = {});
 
 }  // namespace tervane

@@ -1,0 +1,142 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <chrono>
+#include <thread>
+#include <vector>
+
+#include <fmt/format.h>
+#include <fmt/ostream.h>
+
+#include "cli/command_line.h"
+#include "cli/commands.h"
+#include "cli/json.h"
+#include "cli/setup_file.h"
+#include "execution/engine_line.h"
+#include "execution/run_log.h"
+#include "execution/setup_run.h"
+#include "platform/os_process.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr std::chrono::milliseconds kInterval{50};
+constexpr std::size_t kBlock = 256u << 10;
+constexpr std::size_t kMostMessages = 500;
+
+/// Runs engines while the command waits.
+class TerminalShell : public EngineShell {
+ public:
+  TerminalShell(const CFlowModelDoc& document, const RunOptions& options, Streams streams)
+      : document_(document), options_(options), streams_(streams) {}
+
+  int Status() const { return status_; }
+
+  Host& Outside() override { return nobody_; }
+  bool HasChanges() const override { return false; }
+  bool DoFileSave() override { return false; }
+  bool IsShiftHeld() const override { return false; }
+  bool IsExecuting() const override { return false; }
+  void Start(const CYbSimpleLaunch& launch, bool showsProgress) override;
+
+ private:
+  void Follow(SetupRun& run);
+  void CopyLog(LogReader& log, LineCutter& cutter);
+  void Understand(const LogPiece& lines);
+  void Tell(const SetupRun& run, const std::string& sentence);
+
+  const CFlowModelDoc& document_;
+  const RunOptions& options_;
+  Streams streams_;
+  NobodyToAsk nobody_;
+  std::vector<EngineMessage> messages_;
+  bool isInterrupted_ = false;
+  int status_ = kCouldNot;
+};
+
+void TerminalShell::Start(const CYbSimpleLaunch& launch, bool /*showsProgress*/) {
+  std::string problem;
+  SetupRun run;
+  const std::optional<RunRequest> request = RequestOf(launch, document_.getResultFolder(), options_.engines, problem);
+  os::KeepEndRequests();
+  if (!request || !run.Start(*request, problem)) {
+    Tell(run, problem);
+    return;
+  }
+  Follow(run);
+  run.MarkTold();
+  const RunOutcome outcome = run.Outcome();
+  if (outcome != RunOutcome::NotStarted) status_ = outcome == RunOutcome::Done ? kDone : kFindings;
+  Tell(run, OutcomeSentence(run.State()));
+  if (isInterrupted_) status_ = kInterrupted;
+}
+
+void TerminalShell::Follow(SetupRun& run) {
+  LogReader log(run.Files().log);
+  LineCutter cutter;
+  for (;;) {
+    const bool isOver = !run.Look();
+    // Before the engine was started, the log is that of an earlier run.
+    if (run.State().program) CopyLog(log, cutter);
+    if (isOver) break;
+    for (int requests = os::TakeEndRequests(); requests > 0; --requests) {
+      if (!isInterrupted_) fmt::print(streams_.err, "{}: stopping the engine\n", options_.file);
+      isInterrupted_ = true;
+      run.Stop();
+    }
+    std::this_thread::sleep_for(kInterval);
+  }
+  Understand(cutter.Rest());
+}
+
+void TerminalShell::CopyLog(LogReader& log, LineCutter& cutter) {
+  std::ostream& to = options_.json ? streams_.err : streams_.out;
+  for (std::string bytes = log.Read(kBlock); !bytes.empty(); bytes = log.Read(kBlock)) {
+    to << bytes;
+    Understand(cutter.Cut(bytes));
+  }
+  to.flush();
+}
+
+void TerminalShell::Understand(const LogPiece& lines) {
+  for (std::size_t i = 0; i < lines.Count() && messages_.size() < kMostMessages; ++i)
+    if (std::optional<EngineMessage> message = EngineMessageOf(lines.Line(i))) messages_.push_back(std::move(*message));
+}
+
+void TerminalShell::Tell(const SetupRun& run, const std::string& sentence) {
+  fmt::print(streams_.err, "{}: {}\n", options_.file, sentence);
+  if (!options_.json) return;
+  const RunState& state = run.State();
+  const auto optional = [](const std::string& text) { return text.empty() ? std::string() : JsonQuoted(text); };
+  const bool hasEnded = state.program && state.HasEnded();
+  std::vector<std::string> findings;
+  for (const EngineMessage& message : messages_)
+    findings.push_back(JsonObject({{"severity", JsonQuoted(message.isError ? "error" : "warning")},
+                                   {"place", optional(message.place)},
+                                   {"text", JsonQuoted(message.text)}}));
+  const RunOutcome outcome = status_ == kCouldNot ? RunOutcome::NotStarted : run.Outcome();
+  fmt::print(streams_.out, "{}\n",
+             JsonObject({{"setup", JsonQuoted(options_.file)},
+                         {"outcome", JsonQuoted(OutcomeName(outcome))},
+                         {"text", JsonQuoted(sentence)},
+                         {"engine", optional(state.engine)},
+                         {"options", optional(state.options)},
+                         {"exitStatus", hasEnded && state.end.signal == 0 ? std::to_string(state.end.status) : ""},
+                         {"signal", hasEnded && state.end.signal != 0 ? std::to_string(state.end.signal) : ""},
+                         {"seconds", hasEnded ? fmt::format("{:.3f}", double(state.ended - state.begun) / 1000) : ""},
+                         {"log", state.program ? JsonQuoted(run.Files().log) : ""},
+                         {"findings", JsonArray(findings)}}));
+}
+
+}  // namespace
+
+int RunCommand(const RunOptions& options, Streams streams) {
+  CFlowModelDoc document;
+  if (!OpenSetup(document, options.file, streams)) return kCouldNot;
+  TerminalShell shell(document, options, streams);
+  document.SetEngineShell(&shell);
+  document.RunEngine(options.argument);
+  return shell.Status();
+}
+
+}  // namespace tervane

@@ -1,0 +1,64 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// One run of an engine: how it is started, followed and stopped. The engine is a child of a small runner program, which
+// nobody's end disturbs; all that is known of it stands in files.
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "core/engine_shell.h"
+#include "execution/run_state.h"
+
+namespace tervane {
+
+/// What a run is started with.
+struct RunRequest {
+  std::string setup;         ///< The file as it stands on disk.
+  std::string resultFolder;  ///< Made where it is missing.
+  std::string engine;        ///< Path of the program.
+  std::string options;       ///< Separated by blanks; may be empty.
+  std::string extraLog;      ///< May be empty.
+  std::string report;        ///< What the run must leave; may be empty.
+};
+
+/// The request that a document's start comes to; nothing, with the problem, when the engine is not there.
+/// `enginePath` is the setting of that name.
+std::optional<RunRequest> RequestOf(const CYbSimpleLaunch& launch, const std::string& resultFolder,
+                                    const std::string& enginePath, std::string& problem);
+
+/// A run that was started or found, by whom ever. Each `Look` reads the files anew; nothing waits.
+class SetupRun {
+ public:
+  /// Starts the engine. False with the problem when it could not be started, also because another run of this setup
+  /// goes on; what the engine itself meets at its start shows at a later look.
+  bool Start(const RunRequest& request, std::string& problem);
+  /// The run that the files tell of: one that goes on, or one whose end nobody was told yet. False when there is none.
+  bool Find(const RunFiles& files);
+
+  const RunFiles& Files() const { return files_; }
+  /// Reads the state. False when it has ended: then it stays as it is.
+  bool Look();
+  const RunState& State() const { return state_; }
+  RunOutcome Outcome() const { return outcome_; }
+
+  /// Asks the engine and all that it has started to end; who has not a few seconds later is ended by force. A second
+  /// time: without waiting. Gives why it cannot be done from here, or nothing.
+  std::string Stop();
+  /// Notes in the files that the user knows how it ended.
+  void MarkTold();
+
+ private:
+  bool ReadState();
+  void SendStops();
+
+  RunFiles files_;
+  RunState state_;
+  RunOutcome outcome_ = RunOutcome::GoingOn;
+  os::DetachedProgram runner_;  ///< Of a run that was started here.
+  int stopsWanted_ = 0, stopsSent_ = 0;
+};
+
+}  // namespace tervane

@@ -1,0 +1,78 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <sstream>
+
+#include <gmock/gmock.h>
+#include <rapidjson/document.h>
+
+#include "cli/command_line.h"
+#include "tests/support/engine_script.h"
+#include "tests/support/setup.h"
+
+namespace tervane {
+namespace {
+
+using testing::HasSubstr;
+
+class RunCommand : public testing::Test {
+ protected:
+  /// Runs the setup with an engine that does these commands.
+  int Tervane(const std::string& commands, std::vector<std::string> options = {}) {
+    test::WriteEngine(folder, "engines/Tvn_Simulation.exe", commands);
+    options.insert(options.begin(), {"run", file, "--engines", folder.File("engines")});
+    out.str({});
+    err.str({});
+    return RunCommandLine(options, out, err);
+  }
+  rapidjson::Document Json() {
+    rapidjson::Document json;
+    json.Parse(out.str().c_str());
+    EXPECT_FALSE(json.HasParseError()) << out.str();
+    return json;
+  }
+
+  test::TempFolder folder;
+  std::string file = folder.Write("karup.tvd", test::SetupText(14, ""));
+  std::ostringstream out, err;
+};
+
+TEST_F(RunCommand, PassesTheEnginesWordsOnAndTellsHowItEnded) {
+  EXPECT_EQ(Tervane("echo \"got $2\"; printf last", {"--wm"}), kDone);
+  EXPECT_EQ(out.str(), "got /WM\nlast");
+  EXPECT_THAT(err.str(), testing::MatchesRegex(".*karup.tvd: The run is done after .* s\\.\n"));
+  EXPECT_EQ(Tervane("exit 7", {"--pp"}), kFindings);
+  EXPECT_THAT(err.str(), HasSubstr("exit status 7"));
+  // What the setup asks for, the preprocessor, should have left its report.
+  EXPECT_EQ(Tervane("true"), kFindings);
+  EXPECT_THAT(err.str(), HasSubstr("karup_results/karup_PreProcessed.kvf"));
+  EXPECT_EQ(Tervane("echo report >karup_results/karup_PreProcessed.kvf"), kDone);
+}
+
+TEST_F(RunCommand, TellsTheSameAsJson) {
+  EXPECT_EQ(Tervane("echo 'error: A/B:Key: \"bad\"'; echo 'warning: odd'; exit 7", {"--wq", "--json"}), kFindings);
+  const rapidjson::Document json = Json();
+  EXPECT_STREQ(json["outcome"].GetString(), "failed");
+  EXPECT_EQ(json["exitStatus"].GetInt(), 7);
+  EXPECT_STREQ(json["options"].GetString(), "/WQ");
+  EXPECT_STREQ(json["log"].GetString(), folder.File("karup_results/karup_Run.log").c_str());
+  EXPECT_GE(json["seconds"].GetDouble(), 0);
+  ASSERT_EQ(json["findings"].Size(), 2u);
+  EXPECT_STREQ(json["findings"][0]["place"].GetString(), "A/B:Key");
+  EXPECT_STREQ(json["findings"][0]["text"].GetString(), "\"bad\"");
+  EXPECT_FALSE(json["findings"][1].HasMember("place"));
+  EXPECT_THAT(err.str(), HasSubstr("warning: odd"));
+}
+
+TEST_F(RunCommand, ARunThatDidNotBeginCouldNotBeDone) {
+  EXPECT_EQ(RunCommandLine({"run", file, "--engines", folder.File("none"), "--json"}, out, err), kCouldNot);
+  EXPECT_THAT(err.str(), HasSubstr("the engine Tvn_Simulation was not found"));
+  EXPECT_STREQ(Json()["outcome"].GetString(), "not started");
+  EXPECT_EQ(RunCommandLine({"run", folder.File("none.tvd")}, out, err), kCouldNot);
+  EXPECT_EQ(Tervane("true", {"--pp", "--wm"}), kCouldNot);
+  test::WriteProgram(folder, "engines/Tvn_Simulation", "no program");
+  EXPECT_EQ(Tervane("true"), kCouldNot);
+  EXPECT_THAT(err.str(), HasSubstr("engines/Tvn_Simulation cannot be started"));
+}
+
+}  // namespace
+}  // namespace tervane
