@@ -246,14 +246,16 @@ void PageView::AddPlot(Control& control) {
 
 void PageView::PlacePlots() {
   const Theme& theme = Theme::Get();
-  const bool isWide = width() >= theme.Scaled(kSideBySide);
+  // Beside a form of a few lines a map would be narrow for nothing.
+  const int neededHeight = scroll_->widget()->sizeHint().height();
+  const bool isWide = width() >= theme.Scaled(kSideBySide) && neededHeight > height() / 3;
   const auto orientation = isWide ? Qt::Horizontal : Qt::Vertical;
   const int all = isWide ? width() : height();
   const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
   const int neededWidth = scroll_->widget()->minimumSizeHint().width() + bar;
   // Above a map the form takes no more than it needs.
-  const int form = isWide ? std::clamp(neededWidth, theme.Scaled(kFormBesidePlot), all * 3 / 5)
-                          : std::min(scroll_->widget()->sizeHint().height(), all / 2);
+  const int form =
+      isWide ? std::clamp(neededWidth, theme.Scaled(kFormBesidePlot), all * 3 / 5) : std::min(neededHeight, all / 2);
   // What the user has moved stays until the page is another one.
   if (split_->orientation() == orientation && formSize_ == form) return;
   formSize_ = form;
