@@ -146,6 +146,7 @@ void Preprocessor::AddPagesBelow(CYbSEKvfBase& node, ReportPage& parent) {
     if (!child->IsDataUsedInSetup()) continue;
     ReportPage page;
     page.title = child->GetTitle();
+    page.abbreviatedTitle = child->GetAbbreviatedTitle();
     const bool isFilled = FillPage(*child, page);
     AddPagesBelow(*child, page);
     if (isFilled || !page.pages.empty()) parent.pages.push_back(std::move(page));

@@ -35,7 +35,7 @@ class KeyWriter {
 void PutPage(KvfFile* file, const ReportPage& page, const std::string& folder) {
   kvfAddSection(file, "PAGE");
   kvfPutParam(file, "TITLE", page.title);
-  kvfPutParam(file, "Abbrev", "");
+  kvfPutParam(file, "Abbrev", page.abbreviatedTitle);
   kvfAddSection(file, page.kind);
   for (const auto& [name, value] : page.keys) std::visit(KeyWriter(file, name, folder), value);
   kvfEndSection(file);

@@ -29,6 +29,7 @@ struct ReportFile {
 /// A page and those below it.
 struct ReportPage {
   std::string title;
+  std::string abbreviatedTitle;  ///< For trees; may be empty.
   std::string kind = report_kind::kNothing;
   using Value = std::variant<int, std::string, ReportFile, CYbDateTime>;
   std::vector<std::pair<std::string, Value>> keys;

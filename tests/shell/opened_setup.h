@@ -7,6 +7,7 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QTest>
+#include <filesystem>
 #include <memory>
 #include <string>
 
@@ -23,16 +24,28 @@
 
 namespace tervane::test {
 
+/// A setup among the examples.
+struct Example {
+  std::string folder, name;
+};
+
 /// A window with one setup open, worked as a user works it.
 class OpenedSetup {
  public:
-  explicit OpenedSetup(std::string_view sections = {}, QSize size = {1280, 800})
-      : path_(folder_.Write("karup.tvd", SetupText(14, sections))),
-        program_(ToQt(folder_.File("settings/quarzel.ini"))),
-        window_(program_) {
-    window_.resize(size);
-    window_.show();
-    EXPECT_TRUE(window_.OpenDocument(ToQt(path_)));
+  explicit OpenedSetup(std::string_view sections = {}, QSize size = {1280, 800}) {
+    Open(
+        "karup.tvd", [sections](const TempFolder& folder) { folder.Write("karup.tvd", SetupText(14, sections)); },
+        size);
+  }
+  /// Opens a copy of the example with all that lies in its folder.
+  explicit OpenedSetup(const Example& example, QSize size = {1280, 800}) {
+    Open(
+        example.name,
+        [&example](const TempFolder& folder) {
+          std::filesystem::copy(std::string(TERVANE_SOURCE_DIR) + "/examples/" + example.folder, folder.Path(),
+                                std::filesystem::copy_options::recursive);
+        },
+        size);
   }
 
   const TempFolder& Folder() const { return folder_; }
@@ -87,10 +100,19 @@ class OpenedSetup {
   }
 
  private:
+  template <class Fill>
+  void Open(const std::string& name, const Fill& fill, QSize size) {
+    fill(folder_);
+    path_ = folder_.File(name);
+    window_.resize(size);
+    window_.show();
+    EXPECT_TRUE(window_.OpenDocument(ToQt(path_)));
+  }
+
   TempFolder folder_;
   std::string path_;
-  tervane::Program program_;
-  MainWindow window_;
+  tervane::Program program_{ToQt(folder_.File("settings/quarzel.ini"))};
+  MainWindow window_{program_};
 };
 
 }  // namespace tervane::test
