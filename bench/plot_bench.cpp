@@ -5,7 +5,11 @@
 // toolkit's own drawing of a picture of as many pixels, turned and shrunk alike.
 #include <QApplication>
 #include <QPainter>
+#include <QTimer>
+#include <algorithm>
+#include <chrono>
 #include <cmath>
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
@@ -13,6 +17,8 @@
 #include <qcustomplot.h>
 
 #include "bench/desktop_figures.h"
+#include "platform/grid_files.h"
+#include "platform/grid_interpolation.h"
 #include "shell/map_canvas.h"
 #include "shell/map_view.h"
 #include "shell/series_plot.h"
@@ -90,6 +96,63 @@ void MeasurePeer() {
            "ms");
 }
 
+/// Calls `passed` with each time that passes between two events of the window, in milliseconds, until `isOver`.
+void WatchEvents(const std::function<bool()>& isOver, const std::function<void(double)>& passed) {
+  QTimer tick;
+  tick.start(0);
+  while (!isOver()) passed(Milliseconds([] { QApplication::processEvents(QEventLoop::WaitForMoreEvents); }));
+}
+
+void MeasureInterpolation() {
+  const GridGeometry geometry{kSide, kSide, 25, 400000, 5000000, 0, {}};
+  std::vector<ScatteredPoint> points;
+  for (int i = 0; i < 20'000; ++i)
+    points.push_back({400000 + i * 7919 % 125000 + 0.5, 5000000 + i * 104729 % 125000 + 0.5, 100.0 + i % 500});
+  const auto computation = [&] {
+    return std::make_shared<ComputedGrid>(
+        "Interpolating", [&](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
+          InterpolationOptions options;
+          options.searchRadius = 10'000;
+          options.threads = 2;
+          options.progress = progress;
+          std::vector<float> values;
+          FileResult result = Interpolate(points, geometry, -9999, options, values);
+          if (result.Ok()) result.error = grid.TakeValues(geometry, std::move(values), -9999, 1000, 100180);
+          return result;
+        });
+  };
+  auto computed = computation();
+  const std::function<MapContent()> content = [&computed] {
+    MapContent map;
+    if (auto grid = NowOrAwaited(computed, map.awaited)) map.grids = {{std::move(grid)}};
+    return map;
+  };
+  NobodyToAsk host;
+  MapView view(host);
+  view.resize(kSize);
+  view.show();
+  QApplication::processEvents();
+  double longest = Milliseconds([&] { view.ShowWhenThere(content, nullptr); });
+  const double whole = Milliseconds([&] {
+    WatchEvents([&] { return !view.IsBusy(); }, [&](double passed) { longest = std::max(longest, passed); });
+  });
+  TellPeer("interpolate 25 million cells of 20,000 points, until the picture", whole, "ms");
+  Tell("  the longest time without an event of the window meanwhile", longest, 50, "ms");
+
+  computed = computation();
+  view.ShowWhenThere(content, nullptr);
+  WatchEvents(
+      [&, start = std::chrono::steady_clock::now()] {
+        return std::chrono::steady_clock::now() - start > std::chrono::milliseconds(500);
+      },
+      [](double) {});
+  view.StopWaiting();
+  // Whoever runs it next waits for the thread that works on it.
+  Progress cancelled;
+  cancelled.Cancel();
+  Tell("  from cancelling to the end of the work", Milliseconds([&] { computed->Run(cancelled); }), 50, "ms");
+}
+
 void MeasureSeries() {
   constexpr std::size_t kValues = 100'000;
   SeriesContent content;
@@ -125,6 +188,7 @@ void Measure() {
   MeasureMap("25 million cells, turned", 20, false);
   MeasureMap("25 million codes, turned", 20, true);
   MeasurePeer();
+  MeasureInterpolation();
   MeasureSeries();
 }
 

@@ -24,6 +24,8 @@ struct GridLayer {
   std::optional<float> highlighted = {};  ///< Two colours: cells of this value, and the others.
   bool withLegend = true;
   double transparency = 0;  ///< 0 opaque, 1 invisible.
+  /// Smallest and largest value of all grids that are shown in turn, so that a colour means the same in each.
+  std::optional<std::pair<float, float>> range = {};
 
   bool operator==(const GridLayer&) const = default;
 };

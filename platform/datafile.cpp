@@ -512,13 +512,17 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
   return {};
 }
 
+std::optional<ItemStatistics> DataFile::StoredStatistics(int item) const {
+  if (item < 1 || static_cast<std::size_t>(item) > Items().size()) return std::nullopt;
+  const ItemStorage& storage = state_->header.storages[static_cast<std::size_t>(item - 1)];
+  if (storage.range.empty()) return std::nullopt;
+  return ItemStatistics{storage.range[0], storage.range[1], storage.count, true};
+}
+
 std::string DataFile::Statistics(int item, ItemStatistics& statistics) const {
-  if (item >= 1 && static_cast<std::size_t>(item) <= Items().size()) {
-    const ItemStorage& storage = state_->header.storages[static_cast<std::size_t>(item - 1)];
-    if (!storage.range.empty()) {
-      statistics = {storage.range[0], storage.range[1], storage.count, true};
-      return {};
-    }
+  if (const auto stored = StoredStatistics(item)) {
+    statistics = *stored;
+    return {};
   }
   ValueSummary summary;
   ValueSelection whole;

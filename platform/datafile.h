@@ -133,6 +133,8 @@ class DataFile {
   /// The number of values that a selection has.
   std::size_t SizeOf(const ValueSelection& selection) const;
 
+  /// The statistics that the file stores; nothing when it stores none.
+  std::optional<ItemStatistics> StoredStatistics(int item) const;
   /// The stored statistics, else those of all values, which takes as long as reading them.
   std::string Statistics(int item, ItemStatistics& statistics) const;
 

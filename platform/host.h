@@ -5,9 +5,12 @@
 // the terminal, a test with a script of expected questions and answers.
 #pragma once
 
+#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
+
+#include "platform/computation.h"
 
 namespace tervane {
 
@@ -48,6 +51,11 @@ class Host {
   virtual std::optional<int> AskItem(const ItemQuestion& question) = 0;
 
   virtual void OpenBrowser(const std::string& address) = 0;
+
+  /// Does what the user has asked for and waits for. A desktop shows meanwhile how far it is, in a window in which it
+  /// can be cancelled; what is computed must touch no node and nothing of the caller's, since that may be done in
+  /// another thread, which may end a little later. False when it was cancelled.
+  virtual bool Compute(const std::shared_ptr<Computation>& computation) { return computation->Run(); }
 
   /// A setting of the program, "" when it was never set.
   virtual std::string Setting(const std::string& name) const = 0;

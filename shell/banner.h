@@ -10,7 +10,7 @@
 
 namespace tervane {
 
-/// A question or a message that waits above a document without standing in the way of the work.
+/// A question or a message that waits below a document without standing in the way of the work.
 class Banner : public QFrame {
   Q_OBJECT
 

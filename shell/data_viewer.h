@@ -2,37 +2,78 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <QDialog>
+#include <QTimer>
+#include <QWidget>
 #include <string>
 
+#include "pages/data_file_view.h"
 #include "platform/host.h"
 #include "platform/units.h"
 
 class QComboBox;
+class QLabel;
+class QLineEdit;
+class QListWidget;
+class QSlider;
+class QSplitter;
 class QStackedWidget;
+class QToolButton;
 
 namespace tervane {
 
+class DataTable;
 class MapView;
 class SeriesPlot;
 
-/// A data file in a window of its own: its items, each as a map or a chart. Nothing is changed here.
-class DataViewer : public QDialog {
+/// A data file in its tab: its items at the left, the chosen one as a map or chart, and its values as a table. Nothing
+/// is changed here; a file that is replaced on the disk is read again.
+class DataViewer : public QWidget {
   Q_OBJECT
 
  public:
-  /// `problem` says why the file cannot be shown; then there is nothing to see.
-  DataViewer(const std::string& path, Host& host, const DisplayUnits& units, std::string& problem, QWidget* parent);
+  /// The user's units must outlive the viewer.
+  DataViewer(const std::string& path, Host& host, const DisplayUnits& units);
+
+  const std::string& Path() const { return file_.Path(); }
+  /// The name of the file.
+  QString Title() const;
+  /// Why there is nothing to show; empty when there is.
+  const std::string& Problem() const { return file_.Problem(); }
+  /// Reads the file again if it is another one than before, or always.
+  void Reload(bool always);
+
+ protected:
+  void showEvent(QShowEvent* event) override;
 
  private:
-  void ShowItem(int number);
+  QWidget* BuildChoices();
+  QWidget* BuildBody();
+  void FollowTheme();
+  /// After another item was chosen, or another file read.
+  void ShowItem();
+  /// After another step or layer was chosen.
+  void ShowSlice();
+  void GoToDate();
+  void Tell(const QString& text);
 
-  std::string path_;
+  DataFileView file_;
   const DisplayUnits& units_;
-  QComboBox* items_;
-  QStackedWidget* views_;
+  DisplayUnits shownUnits_;
+  QStackedWidget* whole_;
+  QLabel* problem_;
+  QListWidget* items_;
+  QWidget* stepRow_;
+  QSlider* steps_;
+  QLabel *step_, *layerLabel_, *told_, *tableText_;
+  QToolButton *earlier_, *later_;
+  QComboBox* layers_;
+  QLineEdit* date_;
+  QSplitter* split_;
+  QStackedWidget* plots_;
   MapView* map_;
   SeriesPlot* chart_;
+  DataTable* table_;
+  QTimer disk_;
 };
 
 }  // namespace tervane

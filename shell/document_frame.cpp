@@ -460,7 +460,12 @@ bool DocumentFrame::Save(const std::string& path) {
 }
 
 void DocumentFrame::ShowBanner(const QString& text, const std::vector<Banner::Answer>& answers) {
-  all_->insertWidget(0, new Banner(text, answers));
+  AddBanner(new Banner(text, answers));
+}
+
+void DocumentFrame::AddBanner(Banner* banner) {
+  // At the foot: what comes while somebody works must move nothing.
+  all_->addWidget(banner);
 }
 
 void DocumentFrame::TellReport() {
@@ -499,7 +504,7 @@ void DocumentFrame::CheckDisk() {
   diskBanner_ = new Banner(isGone ? tr("The file is no more on disk. A save writes it anew.")
                                   : tr("Another program has changed the file on disk."),
                            answers);
-  all_->insertWidget(0, diskBanner_);
+  AddBanner(diskBanner_);
 }
 
 void DocumentFrame::RunAutosave() {

@@ -113,6 +113,7 @@ class DocumentFrame : public QWidget {
   CYbSEKvfBase* NodeOf(std::uint64_t serial) const;
   /// When the node that is shown has left the setup: the nearest above it that is still there.
   void LeaveGoneNode();
+  void AddBanner(Banner* banner);
   void RunAutosave();
   void TellReport();
   void FollowRun();

@@ -84,7 +84,7 @@ int Run(const Typed& typed, QApplication& application) {
   if (!typed.size.empty()) window.resize(ParseSize(typed.size));
   window.show();
   for (const std::string& file : typed.files)
-    if (!window.OpenDocument(ToQt(file)) && isPicture) return 2;
+    if (!window.OpenFile(ToQt(file)) && isPicture) return 2;
   if (!typed.page.empty() && (!window.Frame() || !window.Frame()->GoToPath(typed.page))) {
     std::fprintf(stderr, "quarzel: %s: there is no page of that path\n", typed.page.c_str());
     if (isPicture) return 2;
@@ -113,7 +113,7 @@ int main(int argc, char** argv) {
   os::PrepareProcess();
   CLI::App commandLine{"The setup editor of the integrated catchment model Tervane.", "quarzel"};
   Typed typed;
-  commandLine.add_option("FILE", typed.files, "Setups (.tvd) to open");
+  commandLine.add_option("FILE", typed.files, "Setups (.tvd) and data files to open");
   commandLine.add_option("--page", typed.page, "The node to show, as Climate/PrecipitationRate");
   commandLine.add_option("--zoom", typed.zoom, "The size of everything, 1.5 for half as large again")
       ->check(CLI::Range(0.5, 3.0));

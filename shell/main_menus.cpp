@@ -20,6 +20,7 @@
 #include "document/view_settings.h"
 #include "execution/engine_search.h"
 #include "execution/execute_flags.h"
+#include "shell/data_viewer.h"
 #include "shell/document_frame.h"
 #include "shell/document_run.h"
 #include "shell/main_window.h"
@@ -91,8 +92,9 @@ void MainWindow::BuildMenus() {
   AddForDocument(file, tr("&What will be saved…"), nullptr, QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_S),
                  [this](DocumentFrame& frame) { ShowChanges(frame); });
   file->addSeparator();
-  AddForDocument(file, tr("&Close"), nullptr, QKeySequence::Close,
-                 [this](DocumentFrame& frame) { CloseDocument(&frame); });
+  Command& closeTab =
+      Add(file, tr("&Close"), nullptr, QKeySequence::Close, [this] { CloseTab(tabs_->currentWidget()); });
+  closeTab.enabled = [this] { return tabs_->count() > 0; };
   Add(file, tr("&Quit"), nullptr, QKeySequence::Quit, [this] { close(); });
   standardBar_->addActions({create.action, open.action, save.action});
   standardBar_->addSeparator();
@@ -205,12 +207,15 @@ void MainWindow::BuildViewMenu() {
 }
 
 void MainWindow::BuildRunMenu() {
-  Command& refresh = AddForDocument(nullptr, tr("R&efresh"), "refresh", QKeySequence::Refresh,
-                                    [](DocumentFrame& frame) { frame.RefreshPlots(); });
+  Command& refresh = Add(nullptr, tr("R&efresh"), "refresh", QKeySequence::Refresh, [this] {
+    if (Frame()) Frame()->RefreshPlots();
+    if (Viewer()) Viewer()->Reload(true);
+  });
+  refresh.enabled = [this] { return tabs_->count() > 0; };
   refresh.action->setToolTip(tr("Refresh graphic"));
   // In a menu bar an icon would take the text's place.
-  Command& refreshInBar =
-      AddForDocument(nullptr, tr("R&efresh"), nullptr, {}, [&refresh](DocumentFrame&) { refresh.action->trigger(); });
+  Command& refreshInBar = Add(nullptr, tr("R&efresh"), nullptr, {}, [&refresh] { refresh.action->trigger(); });
+  refreshInBar.enabled = refresh.enabled;
   menuBar()->addAction(refreshInBar.action);
 
   QMenu* run = menuBar()->addMenu(tr("&Run"));
@@ -353,14 +358,16 @@ void MainWindow::SyncCommands() {
     redo->setText(named(tr("&Redo"), current ? current->Session().Steps().RedoName() : std::string()));
   for (int i = 0; i < tabs_->count(); ++i) {
     const auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i));
-    tabs_->setTabText(i, QString(frame->Title()).replace("&", "&&"));
-    tabs_->setTabToolTip(i, ToQt(frame->Session().Path()));
+    const auto* viewer = qobject_cast<DataViewer*>(tabs_->widget(i));
+    tabs_->setTabText(i, QString(frame ? frame->Title() : viewer->Title()).replace("&", "&&"));
+    tabs_->setTabToolTip(i, ToQt(frame ? frame->Session().Path() : viewer->Path()));
   }
-  setWindowTitle(current ? tr("%1 - Quarzel").arg(current->Title()) : QString("Quarzel"));
+  const QString title = current ? current->Title() : Viewer() ? Viewer()->Title() : QString();
+  setWindowTitle(title.isEmpty() ? QString("Quarzel") : tr("%1 - Quarzel").arg(title));
   setWindowModified(false);
   if (welcome_) {
-    if (!current) welcome_->Show(program_.RecentFiles());
-    stack_->setCurrentWidget(current ? static_cast<QWidget*>(tabs_) : welcome_);
+    if (tabs_->count() == 0) welcome_->Show(program_.RecentFiles());
+    stack_->setCurrentWidget(tabs_->count() > 0 ? static_cast<QWidget*>(tabs_) : welcome_);
   }
   // The model's commands are of use only while a document is open.
   modelBar_->setEnabled(current != nullptr);

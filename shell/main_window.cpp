@@ -5,6 +5,8 @@
 #include <QApplication>
 #include <QCloseEvent>
 #include <QDateTime>
+#include <QDesktopServices>
+#include <QFile>
 #include <QFileInfo>
 #include <QLabel>
 #include <QMenuBar>
@@ -19,6 +21,7 @@
 
 #include "document/edit_session.h"
 #include "platform/files.h"
+#include "platform/text_fields.h"
 #include "shell/changes_dialog.h"
 #include "shell/data_viewer.h"
 #include "shell/document_frame.h"
@@ -35,10 +38,32 @@ namespace {
 constexpr const char* kSetupFilter = "Tervane  Flow Model(*.tvd)|*.tvd|All Files (*.*)|*||";
 constexpr const char *kGeometry = "Window/Geometry", *kState = "Window/State", *kFrameLayout = "Window/Panes";
 
-QStringList DroppedSetups(const QMimeData* data) {
+bool IsDataFile(const QString& path) {
+  const QString suffix = QFileInfo(path).suffix().toLower();
+  return suffix.startsWith("nds") || suffix == "nc";
+}
+
+/// Lines of numbers, which some readers of grids would take as well.
+bool IsNamedAsText(const QString& path) {
+  const QString suffix = QFileInfo(path).suffix().toLower();
+  return suffix == "txt" || suffix == "xyz" || suffix == "csv";
+}
+
+/// By what stands at its begin.
+bool IsText(const std::string& path) {
+  QFile file(ToQt(path));
+  constexpr qint64 kBegin = 4096;
+  if (!file.open(QIODevice::ReadOnly)) return false;
+  const QByteArray begin = file.read(kBegin);
+  return WhyNoText({begin.constData(), static_cast<std::size_t>(begin.size())}).empty();
+}
+
+QStringList DroppedFiles(const QMimeData* data) {
   QStringList paths;
-  for (const QUrl& url : data->urls())
-    if (url.isLocalFile() && url.toLocalFile().endsWith(".tvd", Qt::CaseInsensitive)) paths << url.toLocalFile();
+  for (const QUrl& url : data->urls()) {
+    const QString path = url.toLocalFile();
+    if (url.isLocalFile() && (path.endsWith(".tvd", Qt::CaseInsensitive) || IsDataFile(path))) paths << path;
+  }
   return paths;
 }
 
@@ -58,8 +83,7 @@ MainWindow::MainWindow(Program& program) : program_(program), host_(this, progra
   statusBar()->addPermanentWidget(zoom_);
   BuildMenus();
   connect(tabs_, &QTabWidget::currentChanged, this, &MainWindow::SyncCommands);
-  connect(tabs_, &QTabWidget::tabCloseRequested, this,
-          [this](int index) { CloseDocument(qobject_cast<DocumentFrame*>(tabs_->widget(index))); });
+  connect(tabs_, &QTabWidget::tabCloseRequested, this, [this](int index) { CloseTab(tabs_->widget(index)); });
   connect(&Theme::Get(), &Theme::Changed, this, &MainWindow::Restyle);
   resize(Theme::Get().Scaled(1180), Theme::Get().Scaled(780));
   restoreGeometry(program_.Settings().value(kGeometry).toByteArray());
@@ -73,6 +97,8 @@ MainWindow::~MainWindow() {
 }
 
 DocumentFrame* MainWindow::Frame() const { return qobject_cast<DocumentFrame*>(tabs_->currentWidget()); }
+
+DataViewer* MainWindow::Viewer() const { return qobject_cast<DataViewer*>(tabs_->currentWidget()); }
 
 DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   const bool isNew = session->Path().empty();
@@ -102,6 +128,7 @@ bool MainWindow::OpenDocument(const QString& path) {
   const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
   for (int i = 0; i < tabs_->count(); ++i) {
     const auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i));
+    if (!frame) continue;
     if (frame->Session().Path() == file || IsSameFile(frame->Session().Path(), file)) {
       tabs_->setCurrentIndex(i);
       return true;
@@ -185,13 +212,38 @@ bool MainWindow::SaveDocumentAs() {
   return path && frame->Save(*path);
 }
 
-void MainWindow::ShowDataFile(const QString& path) {
-  std::string problem;
-  auto* viewer = new DataViewer(FromQt(path), host_, program_.Units(), problem, this);
-  if (problem.empty()) return viewer->show();
-  delete viewer;
-  host_.Tell(problem, Host::Icon::Error);
+bool MainWindow::ShowDataFile(const QString& path) {
+  const std::string file = path.isEmpty() ? std::string() : FromQt(QFileInfo(path).absoluteFilePath());
+  if (file.empty()) {
+    host_.Tell("No file is chosen.", Host::Icon::Warning);
+    return false;
+  }
+  for (int i = 0; i < tabs_->count(); ++i) {
+    auto* viewer = qobject_cast<DataViewer*>(tabs_->widget(i));
+    if (!viewer || (viewer->Path() != file && !IsSameFile(viewer->Path(), file))) continue;
+    tabs_->setCurrentIndex(i);
+    viewer->Reload(false);
+    return true;
+  }
+  std::unique_ptr<DataViewer> viewer;
+  if (!IsNamedAsText(path)) {
+    viewer = std::make_unique<DataViewer>(file, host_, program_.Units());
+    if (viewer->Problem().empty()) {
+      const QString title = viewer->Title();
+      tabs_->setCurrentIndex(tabs_->addTab(viewer.release(), title));
+      SyncCommands();
+      return true;
+    }
+  }
+  if (FileExists(file) && IsText(file) && QDesktopServices::openUrl(QUrl::fromLocalFile(ToQt(file)))) return true;
+  host_.Tell(viewer             ? viewer->Problem()
+             : FileExists(file) ? FromQt(tr("The desktop has no editor for %1.").arg(ToQt(file)))
+                                : FromQt(tr("%1 is not there.").arg(ToQt(file))),
+             Host::Icon::Error);
+  return false;
 }
+
+bool MainWindow::OpenFile(const QString& path) { return IsDataFile(path) ? ShowDataFile(path) : OpenDocument(path); }
 
 void MainWindow::ReloadDocument(DocumentFrame* frame) {
   const QString path = ToQt(frame->Session().Path());
@@ -225,6 +277,13 @@ void MainWindow::ShowChanges(DocumentFrame& frame) {
   if (dialog.exec() == QDialog::Accepted) SaveDocument();
 }
 
+bool MainWindow::CloseTab(QWidget* tab) {
+  if (auto* frame = qobject_cast<DocumentFrame*>(tab)) return CloseDocument(frame);
+  delete tab;
+  SyncCommands();
+  return true;
+}
+
 bool MainWindow::CloseDocument(DocumentFrame* frame) {
   if (!frame) return true;
   tabs_->setCurrentWidget(frame);
@@ -252,7 +311,7 @@ bool MainWindow::CloseDocument(DocumentFrame* frame) {
 
 void MainWindow::closeEvent(QCloseEvent* event) {
   while (tabs_->count() > 0) {
-    if (!CloseDocument(qobject_cast<DocumentFrame*>(tabs_->widget(0)))) {
+    if (!CloseTab(tabs_->widget(0))) {
       event->ignore();
       return;
     }
@@ -264,16 +323,18 @@ void MainWindow::closeEvent(QCloseEvent* event) {
 
 void MainWindow::changeEvent(QEvent* event) {
   QMainWindow::changeEvent(event);
-  if (event->type() == QEvent::ActivationChange && isActiveWindow() && Frame()) Frame()->CheckDisk();
+  if (event->type() != QEvent::ActivationChange || !isActiveWindow()) return;
+  if (Frame()) Frame()->CheckDisk();
+  if (Viewer()) Viewer()->Reload(false);
 }
 
 void MainWindow::dragEnterEvent(QDragEnterEvent* event) {
-  if (!DroppedSetups(event->mimeData()).isEmpty()) event->acceptProposedAction();
+  if (!DroppedFiles(event->mimeData()).isEmpty()) event->acceptProposedAction();
 }
 
 void MainWindow::dropEvent(QDropEvent* event) {
   event->acceptProposedAction();
-  for (const QString& path : DroppedSetups(event->mimeData())) OpenDocument(path);
+  for (const QString& path : DroppedFiles(event->mimeData())) OpenFile(path);
 }
 
 void MainWindow::SetZoom(double zoom) {
@@ -297,7 +358,8 @@ void MainWindow::Restyle() {
   connect(welcome_, &WelcomePage::OpenWanted, this, [this] {
     if (const auto path = host_.AskFileToOpen({"Open", kSetupFilter, "tvd", {}})) OpenDocument(ToQt(*path));
   });
-  for (int i = 0; i < tabs_->count(); ++i) qobject_cast<DocumentFrame*>(tabs_->widget(i))->Redraw();
+  for (int i = 0; i < tabs_->count(); ++i)
+    if (auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i))) frame->Redraw();
   SyncCommands();
 }
 

@@ -19,6 +19,7 @@ class QToolBar;
 namespace tervane {
 
 class CExecuteEngineFlagsKvf;
+class DataViewer;
 class DocumentFrame;
 class EditSession;
 class Program;
@@ -32,17 +33,25 @@ class MainWindow : public QMainWindow {
   explicit MainWindow(Program& program);
   ~MainWindow() override;
 
+  /// The document that is shown; null where there is none.
   DocumentFrame* Frame() const;
   void NewDocument();
   /// Opens a setup in a tab of its own, or shows the one in which it is open. False when it could not be opened; the
   /// user has been told why.
   bool OpenDocument(const QString& path);
+  /// Shows a data file in a tab of its own, a text file in the desktop's editor. False when neither can be done; the
+  /// user has been told why.
+  bool ShowDataFile(const QString& path);
+  /// One or the other, by the file's name.
+  bool OpenFile(const QString& path);
   /// Offers what a crash left of setups that nobody opens by name.
   void OfferRecoveries();
   bool SaveDocument();
   bool SaveDocumentAs();
   /// False when the user wants to go on with it.
   bool CloseDocument(DocumentFrame* frame);
+  /// The same of any tab.
+  bool CloseTab(QWidget* tab);
 
  protected:
   void closeEvent(QCloseEvent* event) override;
@@ -74,8 +83,9 @@ class MainWindow : public QMainWindow {
   void SyncCommands();
   void RestyleCommands();
 
+  /// The data file that is shown; null where there is none.
+  DataViewer* Viewer() const;
   DocumentFrame* AddFrame(std::unique_ptr<EditSession> session);
-  void ShowDataFile(const QString& path);
   void ReloadDocument(DocumentFrame* frame);
   void ShowChanges(DocumentFrame& frame);
   void CopyToKeyboardWidget(const char* operation);

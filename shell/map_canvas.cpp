@@ -78,7 +78,8 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
     const auto same = std::ranges::find_if(old, [&](const auto& layer) {
       // How transparent a layer is, or whether it has a legend, does not change its colours.
       return layer && layer->grid.grid == grid.grid && layer->grid.isCodes == grid.isCodes &&
-             layer->grid.highlighted == grid.highlighted && layer->unitKey == unitKey;
+             layer->grid.highlighted == grid.highlighted && layer->grid.range == grid.range &&
+             layer->unitKey == unitKey;
     });
     if (same != old.end()) {
       layers_.push_back(std::move(*same));

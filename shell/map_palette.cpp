@@ -137,15 +137,20 @@ MapPalette MapPalette::Of(const GridLayer& layer, const DisplayUnits* units) {
   else if (layer.isCodes)
     palette.MakeCodes(grid);
   else
-    palette.MakeClasses(grid, ShownUnit(grid.ItemType(), grid.ItemUnit(), units));
+    palette.MakeClasses(layer, ShownUnit(grid.ItemType(), grid.ItemUnit(), units));
   return palette;
 }
 
-void MapPalette::MakeClasses(const CTvn2DOrthoRotatedGridData& grid, const ShownUnit& unit) {
-  float largest = 0, smallest = 0;
-  if (!grid.GetMaxMin(largest, smallest)) return;
-  constexpr float kMost = std::numeric_limits<float>::max();
-  const Range range = RangeOf(grid, std::max(smallest, -kMost), std::min(largest, kMost));
+void MapPalette::MakeClasses(const GridLayer& layer, const ShownUnit& unit) {
+  Range range;
+  if (layer.range) {
+    range = {static_cast<double>(layer.range->first), static_cast<double>(layer.range->second)};
+  } else {
+    float largest = 0, smallest = 0;
+    if (!layer.grid->GetMaxMin(largest, smallest)) return;
+    constexpr float kMost = std::numeric_limits<float>::max();
+    range = RangeOf(*layer.grid, std::max(smallest, -kMost), std::min(largest, kMost));
+  }
   // The numbers are to be nice in the unit in which the user sees them.
   const std::vector<double> shown = ClassBorders(unit.Shown(range.low), unit.Shown(range.high));
   for (const double border : shown) borders_.push_back(unit.Stored(border));

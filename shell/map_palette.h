@@ -70,7 +70,7 @@ class MapPalette {
  private:
   enum class Kind { Classes, Codes, Highlighted };
 
-  void MakeClasses(const CTvn2DOrthoRotatedGridData& grid, const ShownUnit& unit);
+  void MakeClasses(const GridLayer& layer, const ShownUnit& unit);
   void MakeCodes(const CTvn2DOrthoRotatedGridData& grid);
   void MakeHighlighted(const GridLayer& layer);
 

@@ -23,6 +23,18 @@ namespace {
 enum ItemRole { kSerialRole = Qt::UserRole, kPathRole, kMarkRole };
 enum Mark { kNoMark, kWarningBelow, kErrorBelow, kWarning, kError };
 
+/// Rows whose marks stand at their right end, so that no title moves when one comes.
+class MarkedRowDelegate : public RowDelegate {
+ public:
+  using RowDelegate::RowDelegate;
+
+ protected:
+  void initStyleOption(QStyleOptionViewItem* option, const QModelIndex& index) const override {
+    RowDelegate::initStyleOption(option, index);
+    option->decorationPosition = QStyleOptionViewItem::Right;
+  }
+};
+
 /// The worst of a node's own findings.
 Mark OwnMark(const CYbSEKvfBase& node) {
   Mark mark = kNoMark;
@@ -44,7 +56,7 @@ Mark MarkOf(const CYbSEKvfBase& node, const std::set<const CYbSEKvfBase*>& withE
 NodeTree::NodeTree(int treeId, QString emptyText) : treeId_(treeId), emptyText_(std::move(emptyText)) {
   setHeaderHidden(true);
   setUniformRowHeights(true);
-  setItemDelegate(new RowDelegate(this));
+  setItemDelegate(new MarkedRowDelegate(this));
   setFrameShape(QFrame::NoFrame);
   setTextElideMode(Qt::ElideRight);
   connect(this, &QTreeWidget::currentItemChanged, this, [this](QTreeWidgetItem* item) {

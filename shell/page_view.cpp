@@ -23,7 +23,7 @@ namespace {
 constexpr int kWidestForm = 860;  ///< In pixels at zoom 1: lines stay short enough to be read.
 constexpr int kSideBySide = 880;  ///< From this width of a page on its map stands beside the form.
 constexpr int kFormBesidePlot = 530;
-constexpr int kMostFindings = 4;  ///< Lines above a form; the tab of findings has them all.
+constexpr int kMostFindings = 4;  ///< Lines below a form; the tab of findings has them all.
 
 enum Column { kLabelColumn, kFieldColumn };
 
@@ -74,12 +74,6 @@ void PageView::Build(const QString& path) {
   place->setTextInteractionFlags(Qt::TextSelectableByMouse);
   place->setToolTip(tr("The node's path, as messages and the command line write it"));
   head->addWidget(place);
-  findings_ = new QLabel;
-  findings_->setWordWrap(true);
-  findings_->setTextFormat(Qt::RichText);
-  findings_->setContentsMargins(0, theme.Scaled(6), 0, theme.Scaled(2));
-  findings_->hide();
-  head->addWidget(findings_);
   all->addWidget(top);
   top->setVisible(ownPage_ != nullptr);
 
@@ -109,6 +103,13 @@ void PageView::Build(const QString& path) {
     split_->setStretchFactor(1, 1);
     all->addWidget(split_, 1);
   }
+  // Below all: a finding that comes or goes must not move the field in which somebody types.
+  findings_ = new QLabel;
+  findings_->setWordWrap(true);
+  findings_->setTextFormat(Qt::RichText);
+  findings_->setContentsMargins(margin, theme.Scaled(6), margin, theme.Scaled(6));
+  findings_->hide();
+  all->addWidget(findings_);
   AlignLabels();
   Sync();
   // What is hidden before it was ever shown leaves the sizes that the layouts above it know.

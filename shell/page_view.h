@@ -18,7 +18,8 @@ namespace tervane {
 
 class ControlWidget;
 
-/// Any page as widgets: the node's title and findings, and the form below, labels aligned over all of its groups.
+/// Any page as widgets: the node's title, the form below, labels aligned over all of its groups, and the findings at
+/// the foot.
 class PageView : public QWidget {
   Q_OBJECT
 

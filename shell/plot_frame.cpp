@@ -22,7 +22,7 @@ namespace {
 
 constexpr double kZoomStep = 1.5;
 constexpr int kNarrow = 460;       ///< In pixels at zoom 1: below, the line breaks into two.
-constexpr int kMoment = 40;        ///< In milliseconds: what takes no longer appears at once.
+constexpr int kMoment = 25;        ///< In milliseconds: what takes no longer appears at once.
 constexpr double kPaperRatio = 2;  ///< Pixels of a picture for one of the screen.
 
 /// A text in one line that gives way where there is no room.

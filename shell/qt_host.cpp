@@ -3,14 +3,25 @@
 #include "shell/qt_host.h"
 
 #include <QDesktopServices>
+#include <QEventLoop>
 #include <QFileDialog>
 #include <QMessageBox>
+#include <QProgressDialog>
+#include <QTimer>
 #include <QUrl>
 
+#include "shell/background.h"
 #include "shell/item_dialog.h"
 #include "shell/qt_text.h"
 
 namespace tervane {
+
+namespace {
+
+constexpr int kMoment = 200;  ///< In milliseconds: what takes no longer is not told of.
+constexpr int kTick = 80;
+
+}  // namespace
 
 QString DialogFilter(const std::string& filter) {
   const QStringList parts = ToQt(filter).split('|', Qt::SkipEmptyParts);
@@ -88,6 +99,34 @@ std::optional<int> QtHost::AskItem(const ItemQuestion& question) {
 }
 
 void QtHost::OpenBrowser(const std::string& address) { QDesktopServices::openUrl(QUrl(ToQt(address))); }
+
+bool QtHost::Compute(const std::shared_ptr<Computation>& computation) {
+  Background background;
+  background.Await({computation});
+  if (background.IsDoneWithin(kMoment)) return true;
+  QProgressDialog dialog(background.Title(), QProgressDialog::tr("Cancel"), 0, 100, window_);
+  dialog.setWindowModality(Qt::WindowModal);
+  dialog.setMinimumDuration(kMoment);
+  dialog.setAutoReset(false);
+  dialog.setAutoClose(false);
+  QEventLoop loop;
+  QTimer tick;
+  QObject::connect(&tick, &QTimer::timeout, &dialog,
+                   [&] { dialog.setValue(static_cast<int>(99 * background.Done())); });
+  QObject::connect(&dialog, &QProgressDialog::canceled, &loop, [&] {
+    background.Cancel();
+    loop.quit();
+  });
+  QObject::connect(&background, &Background::Ended, &loop, &QEventLoop::quit);
+  tick.start(kTick);
+  dialog.setValue(0);
+  // The dialog handles events too.
+  if (background.IsWaiting()) loop.exec();
+  // Whoever runs it next waits for the thread that works on it, and then finds it done or cancelled.
+  Progress cancelled;
+  cancelled.Cancel();
+  return computation->Run(cancelled);
+}
 
 std::string QtHost::Setting(const std::string& name) const { return FromQt(settings_.value(ToQt(name)).toString()); }
 

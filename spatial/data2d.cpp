@@ -25,11 +25,18 @@ int FirstUnit(int itemType) {
   return found ? BaseUnit(*found).key : kDimensionlessUnit;
 }
 
+InterpolationOptions OnAllCores(ProgressPart progress) {
+  InterpolationOptions work;
+  work.threads = std::max(1, static_cast<int>(std::thread::hardware_concurrency()));
+  work.progress = progress;
+  return work;
+}
+
 }  // namespace
 
-FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid) {
+FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work, CTvn2DOrthoRotatedGridData& grid) {
   // The file's own geometry counts; nothing is resampled.
-  if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid, progress);
+  if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid, work.progress);
   const bool isXyz = source.type == CData2DKvf::kXyzFile;
   if (source.itemType == kCodeItemType && !isXyz) {
     PolygonFile polygons;
@@ -37,7 +44,7 @@ FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrth
     polygons.attribute = source.attribute;
     polygons.axisUnit = source.axisUnit;
     ZoneTable zones;
-    return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, progress);
+    return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, work.progress);
   }
   ScatteredFile points;
   points.path = source.file;
@@ -46,11 +53,9 @@ FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrth
   points.axisUnit = source.axisUnit;
   points.itemUnit = source.itemUnit;
   points.itemType = source.itemType;
-  InterpolationOptions options;
+  InterpolationOptions options = work;
   options.method = static_cast<InterpolationMethod>(source.interpMethod);
   options.searchRadius = source.searchRadius;
-  options.threads = std::max(1, static_cast<int>(std::thread::hardware_concurrency()));
-  options.progress = progress;
   return grid.CreateGridData_GIS(source.geometry, kUsualDeleteValue, points, options);
 }
 
@@ -126,7 +131,7 @@ std::shared_ptr<CTvn2DOrthoRotatedGridData> CData2DKvf::CreateGridData(std::stri
   const GridSource source = CurrentSource();
   if (source.type == kUniform) return nullptr;
   auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
-  const FileResult result = BuildGrid(source, {}, *grid);
+  const FileResult result = BuildGrid(source, OnAllCores({}), *grid);
   if (problem) *problem = result.error;
   if (!result.Ok()) return nullptr;
   if (source.type == kShapeFile) grid->SetItemName(GetTitle());
@@ -141,7 +146,7 @@ std::shared_ptr<ComputedGrid> CData2DKvf::GridComputation() {
     const std::string name = source.type == kShapeFile ? GetTitle() : std::string();
     auto made = std::make_shared<ComputedGrid>(fmt::format("{} {}", verb, FileNameOf(source.file)),
                                                [source, name](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
-                                                 FileResult result = BuildGrid(source, progress, grid);
+                                                 FileResult result = BuildGrid(source, OnAllCores(progress), grid);
                                                  if (!name.empty()) grid.SetItemName(name);
                                                  return result;
                                                });

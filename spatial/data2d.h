@@ -43,7 +43,7 @@ struct GridSource {
 };
 
 /// Makes the grid of a source; it asks no node, so that another thread may do it. `grid` stays as it was on failure.
-FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid);
+FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work, CTvn2DOrthoRotatedGridData& grid);
 
 class CData2DKvf : public CTvnKvfBase {
  public:

@@ -45,8 +45,35 @@ bool MayReplace(const FileName& file, Host& host) {
   return host.Ask(question, Host::Icon::Question, Host::Buttons::YesNo) == Host::Answer::Yes;
 }
 
+/// Cells along the edges of a model domain are 2, its corners lie outside.
+void PaintEdges(CTvn2DOrthoRotatedGridData& grid, float deleteValue) {
+  const int nx = grid.Geometry().nx, ny = grid.Geometry().ny;
+  float* cells = grid.GetData();
+  for (int j = 0; j < ny; ++j) {
+    for (int i = 0; i < nx; ++i) {
+      const bool isAtSide = i == 0 || i == nx - 1, isAtEnd = j == 0 || j == ny - 1;
+      float& cell = cells[static_cast<std::size_t>(j) * static_cast<std::size_t>(nx) + static_cast<std::size_t>(i)];
+      if (isAtSide && isAtEnd)
+        cell = deleteValue;
+      else if (isAtSide || isAtEnd)
+        cell = 2.0F;
+    }
+  }
+}
+
 /// Stays in the dialog without a message: the user was asked already.
 constexpr const char* kStay = " ";
+
+/// Writes a file while the user may watch and give up; gives why the dialog must stay.
+std::string Write(const FileName& file, Host& host,
+                  std::function<FileResult(const std::string& path, ProgressPart progress)> write) {
+  struct Nothing {};
+  const auto writing =
+      std::make_shared<Computed<Nothing>>(fmt::format("Writing {}", FileNameOf(file.Absolute())),
+                                          [path = file.Absolute(), write = std::move(write)](
+                                              Nothing&, ProgressPart progress) { return write(path, progress); });
+  return host.Compute(writing) ? writing->Problem() : kStay;
+}
 
 std::optional<FileName> RunDialog(const PageContext& context, const char* title, CYbSEDlgBase& dialog,
                                   const FileName& file, const std::function<std::string()>& create) {
@@ -114,48 +141,55 @@ void CData2DNdsCreateDlg::Describe(PageForm& form) {
 }
 
 std::string CData2DNdsCreateDlg::ImportText() {
-  isTextLoaded_ = false;
+  imported_ = nullptr;
   const ItemType* type = FindItemType(itemType_);
   const int unit = type && Context().displayUnits ? Context().displayUnits->UnitKey(itemType_)
                    : type                         ? BaseUnit(*type).key
                                                   : 0;
-  const FileResult result = imported_.ReadTextFile(textFile_.Absolute(), geometry_, deleteValue_, unit, itemType_);
-  if (!result.Ok()) return result.error;
-  isTextLoaded_ = true;
-  imported_.GetXYAxisInfo(&geometry_.nx, &geometry_.ny, &geometry_.cellSize);
-  return result.note;
+  const auto reading = std::make_shared<Computed<ImportedGrid>>(
+      fmt::format("Reading {}", FileNameOf(textFile_.Absolute())),
+      [path = textFile_.Absolute(), geometry = geometry_, deleteValue = deleteValue_, unit, itemType = itemType_](
+          ImportedGrid& read, ProgressPart progress) {
+        FileResult result = read.grid.ReadTextFile(path, geometry, deleteValue, unit, itemType, progress);
+        read.note = result.note;
+        return result;
+      });
+  if (!Outside().Compute(reading)) return {};
+  imported_ = reading->Result();
+  if (!imported_) return reading->Problem();
+  imported_->grid.GetXYAxisInfo(&geometry_.nx, &geometry_.ny, &geometry_.cellSize);
+  return imported_->note;
 }
 
-std::string CData2DNdsCreateDlg::MakeGrid(CTvn2DOrthoRotatedGridData& grid) const {
+std::function<std::string(CTvn2DOrthoRotatedGridData&)> CData2DNdsCreateDlg::GridMaker() const {
   const ItemType* type = FindItemType(itemType_);
   const int unit = type && itemType_ != kUndefinedItemType ? BaseUnit(*type).key : 0;
-  if (!isDomain_) return grid.SetGridData(geometry_, fixedValue_, deleteValue_, unit, itemType_);
-  if (std::string problem = grid.SetGridData(geometry_, 1.0F, deleteValue_, unit, itemType_); !problem.empty())
+  return [geometry = geometry_, value = fixedValue_, deleteValue = deleteValue_, unit, itemType = itemType_,
+          isDomain = isDomain_](CTvn2DOrthoRotatedGridData& grid) {
+    if (!isDomain) return grid.SetGridData(geometry, value, deleteValue, unit, itemType);
+    std::string problem = grid.SetGridData(geometry, 1.0F, deleteValue, unit, itemType);
+    if (problem.empty()) PaintEdges(grid, deleteValue);
     return problem;
-  const int nx = geometry_.nx, ny = geometry_.ny;
-  float* cells = grid.GetData();
-  for (int j = 0; j < ny; ++j) {
-    for (int i = 0; i < nx; ++i) {
-      const bool isAtSide = i == 0 || i == nx - 1, isAtEnd = j == 0 || j == ny - 1;
-      float& cell = cells[static_cast<std::size_t>(j) * static_cast<std::size_t>(nx) + static_cast<std::size_t>(i)];
-      if (isAtSide && isAtEnd)
-        cell = deleteValue_;
-      else if (isAtSide || isAtEnd)
-        cell = 2.0F;
-    }
-  }
-  return {};
+  };
 }
 
 std::string CData2DNdsCreateDlg::CreateFile() {
-  if (contents_ == kTextFile && !isTextLoaded_) return "Load a valid text file";
-  if (contents_ == kTextFile)
-    imported_.SetDeleteValue(deleteValue_);
-  else if (const std::string problem = MakeGrid(imported_); !problem.empty())
-    return problem;
-  imported_.SetItemName(forNode_.GetTitle());
+  if (contents_ == kTextFile && !imported_) return "Load a valid text file";
+  if (contents_ == kFixedValue)
+    if (std::string problem = geometry_.Problem(); !problem.empty()) return problem;
   if (!MayReplace(gridFile_, Outside())) return kStay;
-  return WriteGridData(gridFile_.Absolute(), imported_).error;
+  return Write(gridFile_, Outside(),
+               [make = GridMaker(), imported = contents_ == kTextFile ? imported_ : nullptr, deleteValue = deleteValue_,
+                name = forNode_.GetTitle()](const std::string& path, ProgressPart progress) {
+                 CTvn2DOrthoRotatedGridData grid;
+                 if (imported)
+                   grid = imported->grid;
+                 else if (std::string problem = make(grid); !problem.empty())
+                   return FileResult{std::move(problem), {}};
+                 if (imported) grid.SetDeleteValue(deleteValue);
+                 grid.SetItemName(name);
+                 return WriteGridData(path, grid, progress);
+               });
 }
 
 // ---- Shapes
@@ -248,7 +282,9 @@ std::string CTvnCreate0DNdsDlg::CreateFile() {
     series.values.assign(series.times.size(), static_cast<float>(value_));
   }
   if (!MayReplace(file_, Outside())) return kStay;
-  return WriteSeriesFile(file_.Absolute(), series).error;
+  return Write(file_, Outside(), [series = std::move(series)](const std::string& path, ProgressPart progress) {
+    return WriteSeriesFile(path, series, progress);
+  });
 }
 
 }  // namespace tervane

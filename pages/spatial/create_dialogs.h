@@ -39,7 +39,8 @@ class CData2DNdsCreateDlg : public CYbSEDlgBase {
   std::string ImportText();
   /// Why the file cannot be made yet; empty when it stands.
   std::string CreateFile();
-  std::string MakeGrid(CTvn2DOrthoRotatedGridData& grid) const;
+  /// What makes the grid of one value, from copies of what the form holds.
+  std::function<std::string(CTvn2DOrthoRotatedGridData&)> GridMaker() const;
 
   enum Contents : int { kFixedValue = 0, kTextFile = 1 };
 
@@ -51,8 +52,11 @@ class CData2DNdsCreateDlg : public CYbSEDlgBase {
   int contents_ = kFixedValue;
   float fixedValue_, deleteValue_;
   FileName textFile_, gridFile_;
-  CTvn2DOrthoRotatedGridData imported_;
-  bool isTextLoaded_ = false;
+  struct ImportedGrid {
+    CTvn2DOrthoRotatedGridData grid;
+    std::string note;
+  };
+  std::shared_ptr<const ImportedGrid> imported_;  ///< Null until a text file was loaded.
 };
 
 /// An empty shape file.

@@ -12,7 +12,6 @@
 
 #include "exchange/grid_state.h"
 #include "exchange/overlays.h"
-#include "platform/datafile.h"
 #include "platform/paths.h"
 #include "simspec/periods.h"
 
@@ -78,7 +77,7 @@ FileResult ReadSeries(const std::string& path, int number, Series& series, Progr
   if (std::string problem = file.Read({number, 0, values.size(), {}}, values, {}, progress); !problem.empty())
     return refused(std::move(problem));
   series.name = item.name;
-  series.unit = item.unitText;
+  series.unit = ShortUnitOf(item);
   series.isStepped = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
   for (std::size_t step = 0; step < values.size(); ++step) {
     series.times.push_back(file.Time().Stamp(step));
@@ -210,6 +209,11 @@ SeriesContent FileChart(const DataFileNode& node) {
   else if (series->IsDone())
     chart.message = series->Problem();
   return chart;
+}
+
+std::string ShortUnitOf(const DataItem& item) {
+  const Unit* unit = FindUnit(item.unitKey);
+  return unit ? std::string(unit->abbreviation) : item.unitText;
 }
 
 Control& UnitKeyChoice(PageForm& form, const std::string& label, const char* key, int& unitKey, int itemType) {

@@ -9,6 +9,7 @@
 
 #include "pages/page.h"
 #include "pages/plots.h"
+#include "platform/datafile.h"
 #include "platform/grid_files.h"
 #include "spatial/file_nodes.h"
 #include "spatial/zone_sync.h"
@@ -28,6 +29,9 @@ MapContent FileMap(const DataFileNode& file, const GridSlice& slice = {});
 MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit);
 /// A chart of the selected item of a file of series, with the simulation's period.
 SeriesContent FileChart(const DataFileNode& file);
+
+/// The unit of an item's values in short, "mm/day"; as the file says it where it is none of ours.
+std::string ShortUnitOf(const DataItem& item);
 
 /// The units of an item type as a choice list over the key that a setup stores.
 Control& UnitKeyChoice(PageForm& form, const std::string& label, const char* key, int& unitKey, int itemType);

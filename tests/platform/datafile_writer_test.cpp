@@ -269,5 +269,44 @@ TEST_F(DataFileWriterTest, WhatNoFileCanHoldIsRefused) {
   EXPECT_EQ(FilesInFolder(), 0u);
 }
 
+TEST_F(DataFileWriterTest, LargeGridsGoInPiecesAndWhatIsCancelledLeavesTheOldFile) {
+  // More than is read at once, and more columns and rows than a compressed piece has.
+  const FileGeometry geometry = Grid(1500, 1100, 1);
+  std::vector<float> values(1500 * 1100);
+  for (std::size_t i = 0; i < values.size(); ++i) values[i] = static_cast<float>(i);
+  for (const bool isCompressed : {false, true}) {
+    SCOPED_TRACE(isCompressed);
+    NewDataFile content;
+    content.geometry = geometry;
+    content.items = {{"Level", 100180, 1000, {}}};
+    content.hasTime = false;
+    content.isCompressed = isCompressed;
+    DataFileWriter writer;
+    Progress written;
+    ASSERT_EQ(writer.Create(path, content), "");
+    ASSERT_EQ(writer.Put(1, values, written), "");
+    ASSERT_EQ(writer.Finish(written).error, "");
+    EXPECT_GT(written.Done(), 0.9);
+
+    DataFile file;
+    ASSERT_EQ(file.Open(path), "");
+    std::vector<float> read(values.size());
+    Progress done;
+    EXPECT_EQ(file.Read({}, read, {}, done), "");
+    EXPECT_EQ(read, values);
+    EXPECT_EQ(done.Done(), 1);
+    Progress cancelled;
+    cancelled.Cancel();
+    EXPECT_THAT(file.Read({}, read, {}, cancelled), HasSubstr("a.nds2: cancelled"));
+
+    const std::string before = ReadFile(path);
+    ASSERT_EQ(writer.Create(path, content), "");
+    EXPECT_THAT(writer.Put(1, values, cancelled), HasSubstr("cancelled"));
+    EXPECT_THAT(writer.Finish(cancelled).error, HasSubstr("cancelled"));
+    EXPECT_EQ(FilesInFolder(), 1U);
+    EXPECT_EQ(ReadFile(path), before);
+  }
+}
+
 }  // namespace
 }  // namespace tervane
