@@ -16,7 +16,7 @@ using namespace std::chrono_literals;
 constexpr auto kInterval = 50ms;
 constexpr std::size_t kBlock = 256u << 10;
 /// How much is read before the state is looked at again.
-constexpr std::size_t kMostAtOnce = 64u << 20;
+constexpr std::size_t kMostAtOnce = 16u << 20;
 
 /// The file's time is the one that the file system keeps, which may count in steps of 2 s.
 bool IsOfRun(const std::string& path, const RunState& state) {
