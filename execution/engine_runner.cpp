@@ -11,6 +11,7 @@
 #include "execution/engine_search.h"
 #include "execution/run_state.h"
 #include "platform/files.h"
+#include "platform/os.h"
 #include "platform/paths.h"
 
 namespace tervane {

@@ -196,10 +196,10 @@ CLocaleScope::~CLocaleScope() {
   _configthreadlocale(perThread_);
 }
 
-std::string ProgramFolder() {
+std::string ProgramPath() {
   std::wstring path(32768, L'\0');
   path.resize(GetModuleFileNameW(nullptr, path.data(), static_cast<DWORD>(path.size())));
-  return TextOfPath(std::filesystem::path(path).parent_path());
+  return TextOfPath(path);
 }
 
 void* LoadSharedLibrary(const std::string& path, std::string& reason) {
@@ -505,9 +505,9 @@ CLocaleScope::~CLocaleScope() {
   if (before_ != nullptr) uselocale(static_cast<locale_t>(before_));
 }
 
-std::string ProgramFolder() {
+std::string ProgramPath() {
   std::error_code error;
-  return std::filesystem::read_symlink("/proc/self/exe", error).parent_path().string();
+  return std::filesystem::read_symlink("/proc/self/exe", error).string();
 }
 
 void* LoadSharedLibrary(const std::string& path, std::string& reason) {

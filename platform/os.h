@@ -101,8 +101,8 @@ class CLocaleScope {
 #endif
 };
 
-/// The folder of the running program; empty where unknown.
-std::string ProgramFolder();
+/// Path of the running program; empty where unknown.
+std::string ProgramPath();
 
 /// Loads a shared library into the process, where it stays to the end. Null, with the system's reason, when that fails.
 void* LoadSharedLibrary(const std::string& path, std::string& reason);

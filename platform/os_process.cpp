@@ -125,12 +125,6 @@ BOOL WINAPI OnConsole(DWORD kind) {
 
 }  // namespace
 
-std::string ProgramPath() {
-  std::wstring path(32768, L'\0');
-  path.resize(GetModuleFileNameW(nullptr, path.data(), static_cast<DWORD>(path.size())));
-  return TextOfPath(path);
-}
-
 bool MayStart(const std::string& path) {
   const DWORD attributes = GetFileAttributesW(Wide(path).c_str());
   return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0;
@@ -315,11 +309,6 @@ std::vector<pid_t> Descendants() {
 #endif
 
 }  // namespace
-
-std::string ProgramPath() {
-  std::error_code error;
-  return std::filesystem::read_symlink("/proc/self/exe", error).string();
-}
 
 bool MayStart(const std::string& path) {
   struct stat info {};

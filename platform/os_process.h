@@ -15,9 +15,6 @@
 
 namespace tervane::os {
 
-/// Path of the running program; empty where unknown.
-std::string ProgramPath();
-
 /// True when a regular file stands there that the user may start.
 bool MayStart(const std::string& path);
 

@@ -30,7 +30,7 @@ struct LoadedModule {
 /// test of the build from theirs.
 LoadedModule LoadRasterModule() {
   const std::string name = os::SharedLibraryName(raster::kModuleName);
-  const std::string folder = os::ProgramFolder();
+  const std::string folder(FolderOf(os::ProgramPath()));
   for (const char* place : {"/", "/../", "/../bin/"}) {
     const std::string path = folder + place + name;
     if (!FileExists(path)) continue;
