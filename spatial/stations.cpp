@@ -152,13 +152,10 @@ std::shared_ptr<CFMSEKvfGroupBase> C2DStationBasedDataKvf::CreateStationItem() {
   return std::make_shared<C2DStationBasedDataTimeSeriesKvf>(kind_, this);
 }
 
-FoundZones C2DStationBasedDataKvf::FindStations() const {
-  if (UsesPolygons())
-    return FindPolygonValues(stations_->ShapeFile().File.Absolute(), stations_->ShapeFile().Attribute(),
-                             stations_->ShapeAxisUnit);
-  if (UsesGridCodes())
-    return FindGridCodes(stations_->GridFile().File.Absolute(), stations_->GridFile().SelectedItem());
-  return {};
+ZoneFinder C2DStationBasedDataKvf::Finder() const {
+  if (UsesPolygons()) return PolygonFinder(stations_->ShapeFile(), stations_->ShapeAxisUnit);
+  if (UsesGridCodes()) return CodeFinder(stations_->GridFile());
+  return [](ProgressPart) { return FoundZones(); };
 }
 
 SyncResult C2DStationBasedDataKvf::SyncStations(const FoundZones& found) {

@@ -155,7 +155,8 @@ class C2DStationBasedDataKvf : public CFMSEKvfBase {
 
   std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
   /// What the source of the station areas holds; nothing for the other distributions.
-  FoundZones FindStations() const;
+  FoundZones FindStations() const { return Finder()({}); }
+  ZoneFinder Finder() const;
   SyncPlan PlanStations(const FoundZones& found) { return PlanSync(*this, found); }
   /// Brings the stations in step; for another distribution than by stations all go.
   SyncResult SyncStations(const FoundZones& found);

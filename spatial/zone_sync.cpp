@@ -15,6 +15,7 @@
 #include "platform/grid_files.h"
 #include "platform/shapes.h"
 #include "platform/text.h"
+#include "spatial/file_nodes.h"
 
 namespace tervane {
 
@@ -123,11 +124,11 @@ Matching Match(const CFMSEKvfBase& owner, const FoundZones& found) {
 
 int CFMSEKvfGroupBase::StationCode() const { return WholeNumberOf(GetStationId()); }
 
-FoundZones FindGridCodes(const std::string& file, int item, const char* noValues) {
+FoundZones FindGridCodes(const std::string& file, int item, ProgressPart progress, const char* noValues) {
   FoundZones found;
   if (file.empty()) return found;
   CTvn2DOrthoRotatedGridData grid;
-  if (const FileResult result = ReadGridData(file, item, grid); !result.Ok()) {
+  if (const FileResult result = ReadGridData(file, item, grid, progress); !result.Ok()) {
     found.unreadable = result.error;
     return found;
   }
@@ -137,13 +138,14 @@ FoundZones FindGridCodes(const std::string& file, int item, const char* noValues
   return found;
 }
 
-FoundZones FindPolygonValues(const std::string& file, const std::string& attribute, int axisUnit) {
+FoundZones FindPolygonValues(const std::string& file, const std::string& attribute, int axisUnit,
+                             ProgressPart progress) {
   FoundZones found;
   found.areCodes = false;
   if (file.empty()) return found;
   CYbShapeData shapes;
   shapes.SetAxisLengthUnit(axisUnit);
-  if (const FileResult result = shapes.ReadShapeAndDbfFile(file, attribute); !result.Ok()) {
+  if (const FileResult result = shapes.ReadShapeAndDbfFile(file, attribute, progress); !result.Ok()) {
     found.unreadable = result.error;
     return found;
   }
@@ -156,6 +158,18 @@ FoundZones FindPolygonValues(const std::string& file, const std::string& attribu
     if (known.insert(text).second) found.ids.push_back(std::move(text));
   }
   return found;
+}
+
+ZoneFinder CodeFinder(const DataFileNode& file) {
+  return [path = file.File.Absolute(), item = file.SelectedItem()](ProgressPart progress) {
+    return FindGridCodes(path, item, progress);
+  };
+}
+
+ZoneFinder PolygonFinder(const CData2DShpFile& file, int axisUnit) {
+  return [path = file.File.Absolute(), attribute = file.Attribute(), axisUnit](ProgressPart progress) {
+    return FindPolygonValues(path, attribute, axisUnit, progress);
+  };
 }
 
 std::vector<CFMSEKvfGroupBase*> ZoneItems(const CFMSEKvfBase& owner) {

@@ -5,13 +5,18 @@
 // attribute, and are kept in step with what the file holds.
 #pragma once
 
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "core/node.h"
+#include "platform/progress.h"
 
 namespace tervane {
+
+class CData2DShpFile;
+class DataFileNode;
 
 /// A child that stands for one code or value.
 class CFMSEKvfGroupBase : public CYbSEKvfGroupBase {
@@ -59,9 +64,15 @@ struct FoundZones {
 };
 
 /// The distinct codes of a grid. `noValues` is what a grid without any is told with.
-FoundZones FindGridCodes(const std::string& file, int item, const char* noValues = FoundZones::kNoValuesInGrid);
+FoundZones FindGridCodes(const std::string& file, int item, ProgressPart progress = {},
+                         const char* noValues = FoundZones::kNoValuesInGrid);
 /// The distinct values of an attribute, formatted with "%f" or "%d" where they are numbers.
-FoundZones FindPolygonValues(const std::string& file, const std::string& attribute, int axisUnit);
+FoundZones FindPolygonValues(const std::string& file, const std::string& attribute, int axisUnit,
+                             ProgressPart progress = {});
+/// Looks into a file for them; it asks no node, so that another thread may do it.
+using ZoneFinder = std::function<FoundZones(ProgressPart progress)>;
+ZoneFinder CodeFinder(const DataFileNode& file);
+ZoneFinder PolygonFinder(const CData2DShpFile& file, int axisUnit);
 
 /// What a synchronisation would do to the children.
 struct SyncPlan {

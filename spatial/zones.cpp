@@ -80,10 +80,10 @@ void CodedZonesKvf::WriteData(KvfFile* file) {
   CFMSEKvfBase::WriteData(file);
 }
 
-FoundZones CodedZonesKvf::FindZones() const {
-  if (UsesPolygons()) return FindPolygonValues(shapeFile_->File.Absolute(), shapeFile_->Attribute(), ShapeAxisUnit);
-  if (UsesGridCodes()) return FindGridCodes(gridFile_->File.Absolute(), gridFile_->SelectedItem());
-  return {};
+ZoneFinder CodedZonesKvf::Finder() const {
+  if (UsesPolygons()) return PolygonFinder(*shapeFile_, ShapeAxisUnit);
+  if (UsesGridCodes()) return CodeFinder(*gridFile_);
+  return [](ProgressPart) { return FoundZones(); };
 }
 
 SyncPlan CodedZonesKvf::PlanZones(const FoundZones& found) {

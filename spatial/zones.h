@@ -85,7 +85,8 @@ class CodedZonesKvf : public CFMSEKvfBase {
   bool UsesPolygons() const { return DistributionType == kDistributed && Type == kPolygons; }
 
   /// What the source holds; nothing is asked for a uniform distribution.
-  FoundZones FindZones() const;
+  FoundZones FindZones() const { return Finder()({}); }
+  ZoneFinder Finder() const;
   /// What `SyncZones` would do.
   SyncPlan PlanZones(const FoundZones& found);
   /// Brings the zones in step with the source.

@@ -266,6 +266,18 @@ void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner) {
   if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
 }
 
+FoundZones FindWatched(Host& host, const ZoneFinder& finder) {
+  const auto finding =
+      std::make_shared<Computed<FoundZones>>("Looking for zones", [finder](FoundZones& found, ProgressPart progress) {
+        found = finder(progress);
+        return FileResult{progress.IsCancelled() ? kCancelled : "", {}};
+      });
+  if (host.Compute(finding) && finding->Result()) return *finding->Result();
+  FoundZones none;
+  none.unreadable = finding->IsDone() ? finding->Problem() : "The file was not read to its end.";
+  return none;
+}
+
 int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const std::function<SyncResult()>& sync) {
   if (!found.unreadable.empty()) {
     host.Tell(fmt::format("{}\n\nThe zones stay as they are.", found.unreadable), Host::Icon::Warning);

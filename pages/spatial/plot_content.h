@@ -41,6 +41,8 @@ Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& 
 /// Where nobody bears that name, the first fills them.
 void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner);
 
+/// Looks for zones or stations while the user may watch and give up; then they are unreadable.
+FoundZones FindWatched(Host& host, const ZoneFinder& finder);
 /// Brings zones or stations in step with a source, asking before work of the user's would be lost. Gives the hints of
 /// what changed; `sync` does it.
 int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const std::function<SyncResult()>& sync);

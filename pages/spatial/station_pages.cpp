@@ -70,7 +70,7 @@ const std::vector<std::string> kTemporal{"Constant", "Time varying (.nds0)"};
 
 int C2DStationBasedDataDlg::Sync() {
   C2DStationBasedDataKvf& n = Node();
-  const FoundZones found = n.FindStations();
+  const FoundZones found = FindWatched(Outside(), n.Finder());
   const int hint = SyncOrAsk(Outside(), found, n.PlanStations(found), [&] { return n.SyncStations(found); });
   KeepGapFill(n.Stations().ShapeGapFillName, n);
   return hint;

@@ -32,7 +32,7 @@ MapContent ZoneMap(const CodedZonesKvf& zones, const CFMSEKvfGroupBase* highligh
 
 int CSubcatchmentDlg::Sync() {
   CodedZonesKvf& n = Node();
-  const FoundZones found = n.FindZones();
+  const FoundZones found = FindWatched(Outside(), n.Finder());
   const int hint = SyncOrAsk(Outside(), found, n.PlanZones(found), [&] { return n.SyncZones(found); });
   KeepGapFill(n.ShapeGapFillName, n);
   return hint;
