@@ -177,7 +177,7 @@ struct DataFile::State {
                           std::span<float> values, const UnitConversion* conversion, ProgressPart progress) const;
   /// Reads a band of a raster; the error names the file.
   std::string ReadRaster(const ItemStorage& storage, const DataItem& item, std::span<float> values,
-                         const UnitConversion* conversion) const;
+                         const UnitConversion* conversion, ProgressPart progress) const;
 };
 
 namespace {
@@ -386,9 +386,18 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
 }
 
 std::string DataFile::State::ReadRaster(const ItemStorage& storage, const DataItem& item, std::span<float> values,
-                                        const UnitConversion* conversion) const {
-  std::string error = raster->Read(storage.variable, {0, 0, item.geometry.nx, item.geometry.ny}, values);
-  if (!error.empty() || conversion == nullptr || Convert(*conversion, values)) return error;
+                                        const UnitConversion* conversion, ProgressPart progress) const {
+  constexpr int kRows = 256;  // as many as the pieces of most rasters have
+  const int nx = item.geometry.nx, ny = item.geometry.ny;
+  for (int j = 0; j < ny; j += kRows) {
+    progress.ThrowIfCancelled();
+    progress.Tell(static_cast<double>(j) / ny);
+    const CellWindow rows{0, j, nx, std::min(kRows, ny - j)};
+    const std::size_t first = static_cast<std::size_t>(j) * static_cast<std::size_t>(nx);
+    std::string error = raster->Read(storage.variable, rows, values.subspan(first, rows.CellCount()));
+    if (!error.empty()) return error;
+  }
+  if (conversion == nullptr || Convert(*conversion, values)) return {};
   return fmt::format("cannot read {}: item {}: {}", path, item.name, kTooLarge);
 }
 
@@ -473,13 +482,14 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
   }
 
   const UnitConversion* converter = conversion ? &*conversion : nullptr;
-  if (state_->raster) return values.empty() ? std::string() : state_->ReadRaster(storage, item, values, converter);
   const bool isInOrder = storage.type == NC_FLOAT && !storage.IsPacked() && storage.IsInOrder();
   // A series is read in one call, grids step by step.
   const bool isSeries = item.dimensions == 0;
   const std::size_t calls = isSeries ? 1 : selection.steps;
   const std::size_t size = calls == 0 ? 0 : values.size() / calls;
   try {
+    if (state_->raster && values.empty()) return {};
+    if (state_->raster) return state_->ReadRaster(storage, item, values, converter, progress);
     for (std::size_t i = 0; i < calls; ++i) {
       const std::span<float> part = values.subspan(i * size, size);
       const auto all = static_cast<double>(calls);

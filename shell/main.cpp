@@ -1,6 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <QApplication>
+#include <QDeadlineTimer>
 #include <QDir>
 #include <QImage>
 #include <QTemporaryDir>
@@ -33,6 +34,7 @@ struct Typed {
   std::vector<std::string> files;
   std::string page, size, screenshot, appearance;
   double zoom = 0;
+  int delay = -1;
 };
 
 /// "1280x800"
@@ -99,7 +101,10 @@ int Run(const Typed& typed, QApplication& application) {
   const auto isBusy = [&window] {
     return std::ranges::any_of(window.findChildren<PlotFrame*>(), [](const auto* plot) { return plot->IsBusy(); });
   };
-  while (isBusy()) application.processEvents(QEventLoop::WaitForMoreEvents);
+  const QDeadlineTimer deadline(typed.delay < 0 ? QDeadlineTimer::Forever : QDeadlineTimer(typed.delay));
+  QTimer tick;
+  tick.start(10);
+  while (isBusy() && !deadline.hasExpired()) application.processEvents(QEventLoop::WaitForMoreEvents);
   if (!WithFewColors(window.grab().toImage()).save(ToQt(typed.screenshot))) {
     std::fprintf(stderr, "quarzel: %s cannot be written\n", typed.screenshot.c_str());
     return 2;
@@ -123,6 +128,9 @@ int main(int argc, char** argv) {
       });
   commandLine.add_option("--appearance", typed.appearance, "light or dark")->check(CLI::IsMember({"light", "dark"}));
   commandLine.add_option("--screenshot", typed.screenshot, "Draw the window into this picture and end");
+  commandLine
+      .add_option("--delay", typed.delay, "Draw it after so many milliseconds, whatever is still being computed")
+      ->check(CLI::NonNegativeNumber);
   commandLine.set_version_flag("--version", "quarzel 0.1.0");
   CLI11_PARSE(commandLine, argc, argv);
 

@@ -40,7 +40,7 @@ constexpr const char *kGeometry = "Window/Geometry", *kState = "Window/State", *
 
 bool IsDataFile(const QString& path) {
   const QString suffix = QFileInfo(path).suffix().toLower();
-  return suffix.startsWith("nds") || suffix == "nc";
+  return suffix.startsWith("nds") || QStringList{"nc", "tif", "tiff", "asc"}.contains(suffix);
 }
 
 /// Lines of numbers, which some readers of grids would take as well.
