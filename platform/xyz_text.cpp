@@ -2,10 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/xyz_text.h"
 
+#include <algorithm>
 #include <new>
 
 #include <fmt/format.h>
 
+#include "platform/file_cache.h"
 #include "platform/text.h"
 #include "platform/text_fields.h"
 
@@ -87,6 +89,28 @@ FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& poi
   FileContent content;
   if (FileResult result = ReadWholeFile(path, content, progress.Part(0, kReading)); !result.Ok()) return result;
   return ParseXyz(content.Text(), path, points, progress.Part(kReading, 1));
+}
+
+std::shared_ptr<const XyzFacts> XyzFactsOf(const std::string& path) {
+  static FileCache<XyzFacts> cache(kMostFacts);
+  return cache.Get(path, "points", [&] {
+    XyzFacts facts;
+    std::vector<ScatteredPoint> points;
+    facts.error = ReadXyzFile(path, points).error;
+    facts.points = points.size();
+    if (points.empty()) return facts;
+    const ScatteredPoint& first = points.front();
+    Envelope& box = facts.extent;
+    box = {first.x, first.y, first.x, first.y};
+    facts.smallest = facts.largest = first.z;
+    for (const ScatteredPoint& point : points) {
+      box = {std::min(box.xMin, point.x), std::min(box.yMin, point.y), std::max(box.xMax, point.x),
+             std::max(box.yMax, point.y)};
+      facts.smallest = std::min(facts.smallest, point.z);
+      facts.largest = std::max(facts.largest, point.z);
+    }
+    return facts;
+  });
 }
 
 }  // namespace tervane

@@ -4,11 +4,14 @@
 // Points with a value in plain text, one on a line: x, y, z.
 #pragma once
 
+#include <cstddef>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "platform/files.h"
+#include "platform/grid.h"
 
 namespace tervane {
 
@@ -28,5 +31,15 @@ FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& poi
 /// The same of a text; `path` stands in the messages.
 FileResult ParseXyz(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points,
                     ProgressPart progress = {});
+
+/// What a text of points holds, read once for all who ask while the file stays as it is. In the file's own units.
+struct XyzFacts {
+  std::string error;  ///< As of `ReadXyzFile`; then the rest says nothing.
+  std::size_t points = 0;
+  Envelope extent;
+  double smallest = 0, largest = 0;  ///< Of the values.
+};
+/// Never null.
+std::shared_ptr<const XyzFacts> XyzFactsOf(const std::string& path);
 
 }  // namespace tervane

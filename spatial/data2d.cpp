@@ -7,6 +7,7 @@
 
 #include <fmt/format.h>
 
+#include "platform/file_cache.h"
 #include "platform/grid_polygons.h"
 #include "platform/paths.h"
 #include "platform/units.h"
@@ -107,7 +108,7 @@ GridSource CData2DKvf::CurrentSource() const {
   if (Type == kUniform) return source;
   const FileName& file = Type == kGridFile ? gridFile_->File : Type == kShapeFile ? shapeFile_->File : xyzFile_->File;
   source.file = file.Absolute();
-  source.stamp = StampOf(source.file);
+  source.stamps = Type == kShapeFile ? StampsOfShape(source.file) : StampsOf(source.file);
   if (Type == kGridFile) {
     source.item = gridFile_->SelectedItem();
     return source;

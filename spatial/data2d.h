@@ -31,7 +31,7 @@ struct Data2DKind {
 struct GridSource {
   int type = 0;
   std::string file;
-  FileStamp stamp;
+  std::vector<FileStamp> stamps;
   int item = 1;
   std::string attribute;
   int interpMethod = 0;
