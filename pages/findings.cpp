@@ -23,6 +23,12 @@ std::uint64_t NearestSerial(const SerialsByPath& serials, const std::string& typ
   return nearest;
 }
 
+SetupFinding::Kind KindOf(Severity severity) {
+  return severity == Severity::Error     ? SetupFinding::Kind::Error
+         : severity == Severity::Warning ? SetupFinding::Kind::Warning
+                                         : SetupFinding::Kind::Note;
+}
+
 }  // namespace
 
 std::string_view KindName(SetupFinding::Kind kind) {
@@ -47,8 +53,8 @@ std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document) {
   WalkNodes(document.Root(), [&](const NodePlace& place) {
     if (!report.IsEmpty()) serials.emplace(place.path, place.node.Serial());
     for (const Finding& finding : place.node.Findings())
-      ofNodes.push_back({finding.severity == Severity::Error ? Kind::Error : Kind::Warning, place.path, finding.text,
-                         finding.key, finding.detail, 0, place.node.Serial()});
+      ofNodes.push_back(
+          {KindOf(finding.severity), place.path, finding.text, finding.key, finding.detail, 0, place.node.Serial()});
   });
   std::vector<SetupFinding> found;
   for (const LoadReport::Entry& entry : report.entries)

@@ -718,11 +718,11 @@ void ControlWidget::SyncMessage() {
 void ControlWidget::SyncFindings() {
   if (!mark_) return;
   QString texts;
-  Severity worst = Severity::Warning;
+  Severity worst = Severity::Note;
   if (control_.node && !control_.key.empty()) {
     for (const Finding& finding : control_.node->Findings()) {
       if (finding.key != control_.key) continue;
-      if (finding.severity == Severity::Error) worst = Severity::Error;
+      worst = std::min(worst, finding.severity);
       texts += (texts.isEmpty() ? "" : "\n") + Translated(finding.text);
       if (!finding.detail.empty()) texts += "\n" + ToQt(finding.detail);
     }
@@ -731,7 +731,7 @@ void ControlWidget::SyncFindings() {
   if (texts.isEmpty()) return;
   mark_->setToolTip(texts);
   mark_->setAccessibleName(texts);
-  const QString icon = worst == Severity::Error ? "error" : "warning";
+  const QString icon = ToQt(std::string(NameOf(worst)));
   mark_->setPixmap(Theme::Get().Icon(icon).pixmap(mark_->size()));
 }
 

@@ -37,6 +37,7 @@ FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrth
     polygons.path = source.file;
     polygons.attribute = source.attribute;
     polygons.axisUnit = source.axisUnit;
+    polygons.gapFill = source.gapFill;
     ZoneTable zones;
     return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, progress);
   }
@@ -55,6 +56,29 @@ FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrth
   return grid.CreateGridData_GIS(source.geometry, kUsualDeleteValue, points, options);
 }
 
+GridSource CodesOfGrid(const CTvnData2DNdsFile& file) {
+  GridSource source;
+  source.type = CData2DKvf::kGridFile;
+  source.file = file.File.Absolute();
+  source.stamps = StampsOf(source.file);
+  source.item = file.SelectedItem();
+  source.itemType = kCodeItemType;
+  return source;
+}
+
+GridSource CodesOfPolygons(const CData2DShpFile& file, int axisUnit, std::string gapFill) {
+  GridSource source;
+  source.type = CData2DKvf::kShapeFile;
+  source.file = file.File.Absolute();
+  source.stamps = StampsOfShape(source.file);
+  source.attribute = file.Attribute();
+  source.axisUnit = axisUnit;
+  source.itemType = kCodeItemType;
+  source.gapFill = std::move(gapFill);
+  if (const auto* domain = file.Important<CCatchmentKvf>("CATCHMENT")) source.geometry = domain->GetModelGeometry();
+  return source;
+}
+
 CData2DKvf::CData2DKvf(Data2DKind kind, CYbSEKvfBase* parent)
     : CTvnKvfBase(kind.title, kind.section, parent),
       FixedValue(kind.fixedValue),
@@ -70,6 +94,8 @@ CData2DKvf::CData2DKvf(Data2DKind kind, CYbSEKvfBase* parent)
   shapeFile_->SetLineShape(!IsCode());
   shapeFile_->SetPointShape(!IsCode());
   IsCode() ? shapeFile_->UseWholeField() : shapeFile_->UseRealField();
+  shapeFile_->SetAxisUnit(ShapeAxisUnit);
+  xyzFile_->SetAxisUnit(ShapeAxisUnit);
   ValidateData();
 }
 
@@ -95,6 +121,7 @@ int CData2DKvf::ValidateData() {
   gridFile_->SetItemType(GetItemType());
   gridFile_->SetFileUsed(Type == kGridFile);
   shapeFile_->SetValidateFlag(Type == kShapeFile);
+  xyzFile_->SetFileUsed(Type == kXyzFile);
   return 1;
 }
 

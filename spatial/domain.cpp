@@ -21,6 +21,8 @@ CCatchmentKvf::CCatchmentKvf(CYbSEKvfBase* parent)
       gridFile_(NewChild<CTvnData2DNdsFile>(kCodeItemType)),
       shapeFile_(NewChild<CData2DShpFile>()) {
   SetPage(kCatchmentPage);
+  gridFile_->SetDomainCheck(0);
+  shapeFile_->SetAxisUnit(ShapeAxisUnit);
   shapeFile_->SetPolygonShape(1);
   shapeFile_->SetValidateFlag(0);
 }
@@ -35,6 +37,12 @@ void CCatchmentKvf::ExchangeKeys(KeyExchange& keys) {
   keys("MapProjShp", MapProjShp);
   keys("rotationShp", rotationShp);
   keys("ShapeAxisUnit", ShapeAxisUnit);
+}
+
+bool CCatchmentKvf::HasGeometry() const {
+  if (Type == kShapeFile) return !shapeFile_->File.IsEmpty();
+  GridGeometry geometry;
+  return ReadGeoInfoFromNdsFile(gridFile_->File.Absolute(), gridFile_->SelectedItem(), geometry).Ok();
 }
 
 GridGeometry CCatchmentKvf::GetModelGeometry() const {
