@@ -29,6 +29,8 @@ int NewCommand(const std::string& file, bool force, Streams streams);
 int ConvertCommand(const std::string& in, const std::string& out, bool force, Streams streams);
 
 int CheckCommand(const std::string& file, bool json, Streams streams);
+/// Whether the data cover the simulation and the domain, and what the forcings come to.
+int CoverageCommand(const std::string& file, bool json, Streams streams);
 
 enum class TreeForm { Text, Paths, Json };
 int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams);

@@ -24,6 +24,7 @@
 #include <QTextBrowser>
 #include <QToolButton>
 #include <QWidgetAction>
+#include <algorithm>
 
 #include "pages/document/help_pages.h"
 #include "pages/plots.h"
