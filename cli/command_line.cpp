@@ -51,11 +51,11 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
       command("new", "Write a setup with all defaults", [&] { return NewCommand(typed.file, typed.force, streams); }));
   create->add_flag("--force", typed.force, "Replace a file that exists, also where an editor has it open");
 
-  CLI::App* check = withFile(command("check", "List errors, warnings, notes and what the file holds that nothing reads",
-                                     [&] {
-                                       return typed.coverage ? CoverageCommand(typed.file, typed.json, streams)
-                                                             : CheckCommand(typed.file, typed.json, streams);
-                                     }));
+  CLI::App* check =
+      withFile(command("check", "List errors, warnings, notes and what the file holds that nothing reads", [&] {
+        return typed.coverage ? CoverageCommand(typed.file, typed.json, streams)
+                              : CheckCommand(typed.file, typed.json, streams);
+      }));
   check->add_flag("--json", typed.json, "As JSON");
   check->add_flag("--coverage", typed.coverage,
                   "Instead, how the data cover simulation and domain, and what the forcings come to each year");

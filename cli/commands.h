@@ -45,7 +45,7 @@ int SetCommand(const std::string& file, const std::string& path, const std::stri
 int DiffCommand(const std::string& from, const std::string& to, bool json, Streams streams);
 int KeysCommand(bool markdown, Streams streams);
 
-/// What a data file holds, by its header alone.
+/// What a data file holds, by its header alone; also of shapes (.shp) and of texts of points (.txt, .xyz), read whole.
 int DataInfoCommand(const std::string& path, bool json, Streams streams);
 /// The range, mean and missing values of each item; reads the whole file.
 int DataStatsCommand(const std::string& path, Streams streams);

@@ -36,8 +36,7 @@ void WriteTable(const Rows& rows, std::ostream& out) {
   }
   for (const auto& row : rows) {
     std::string line;
-    for (std::size_t i = 0; i < row.size(); ++i)
-      line += "  " + row[i] + std::string(widths[i] - WidthOf(row[i]), ' ');
+    for (std::size_t i = 0; i < row.size(); ++i) line += "  " + row[i] + std::string(widths[i] - WidthOf(row[i]), ' ');
     while (!line.empty() && line.back() == ' ') line.pop_back();
     fmt::print(out, "{}\n", line);
   }
@@ -62,8 +61,8 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
   fmt::print(out, "simulation: {}\ndomain: {}\n", SimulationText(board), DomainText(board));
   Rows rows{{"state", "data", "file", "item", "period", "simulation", "domain"}};
   for (const CoverageRow& row : board.rows)
-    rows.push_back({std::string(NameOf(row.state)), row.file.title, std::string(FileNameOf(row.file.use.path)), row.item,
-                    row.PeriodText(), row.TimeText(), row.AreaText()});
+    rows.push_back({std::string(NameOf(row.state)), row.file.title, std::string(FileNameOf(row.file.use.path)),
+                    row.item, row.PeriodText(), row.TimeText(), row.AreaText()});
   fmt::print(out, "\nfiles: {}\n", board.rows.size());
   if (!board.rows.empty()) WriteTable(rows, out);
   for (const CoverageRow& row : board.rows)

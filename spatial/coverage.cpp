@@ -91,8 +91,8 @@ CoverageRequest AskCoverage(CYbSEKvfBase& root) {
     if (!place.takesPart) return;
     if (const auto* user = dynamic_cast<const FileUser*>(&place.node))
       if (std::optional<FileUse> use = user->UsedFile())
-        request.files.push_back({place.path, place.node.Serial(), TitleOf(place.node), *use,
-                                 ValuesOf(place.node, *use), place.node.Findings()});
+        request.files.push_back({place.path, place.node.Serial(), TitleOf(place.node), *use, ValuesOf(place.node, *use),
+                                 place.node.Findings()});
     if (const auto* forcing = dynamic_cast<const ForcingNode*>(&place.node))
       request.forcings.push_back({place.path, place.node.Serial(), forcing->CurrentForcing()});
   });
@@ -135,9 +135,9 @@ class DomainMeans {
   std::string Read(std::size_t step, double& mean) {
     const ValueSelection selection{number_, step, 1, item_.dimensions == 3 ? std::optional(0) : std::nullopt};
     if (std::string error = file_.Read(selection, values_, item_.itemType); !error.empty()) return error;
-    const bool isWatched = !watched_ || file_.Time().stamps.empty() ||
-                           (file_.Time().stamps[step] > watched_->start &&
-                            (step == 0 || file_.Time().stamps[step - 1] < watched_->end));
+    const bool isWatched =
+        !watched_ || file_.Time().stamps.empty() ||
+        (file_.Time().stamps[step] > watched_->start && (step == 0 || file_.Time().stamps[step - 1] < watched_->end));
     double sum = 0;
     std::size_t count = 0;
     for (std::size_t i = 0; i < places_.size(); ++i) {
@@ -373,7 +373,8 @@ void BoardMaker::LookForCells(CoverageRow& row) {
     if (result.Ok()) {
       const std::vector<float> values = Resample(grid, board_.domain->Geometry(), Resampling::Nearest);
       for (std::size_t i = 0; i < values.size(); ++i)
-        if (!board_.domain->IsEmptyValue(board_.domain->Values()[i])) isMissing.push_back(values[i] == kUsualDeleteValue);
+        if (!board_.domain->IsEmptyValue(board_.domain->Values()[i]))
+          isMissing.push_back(values[i] == kUsualDeleteValue);
     }
   }
   if (row.problem.empty()) TakeMissing(row, isMissing);
@@ -394,10 +395,12 @@ void BoardMaker::TakeMissing(CoverageRow& row, const std::vector<bool>& isMissin
 }
 
 void BoardMaker::Conclude(CoverageRow& row) {
-  const auto add = [&](Severity severity, std::string text) { row.remarks.push_back({severity, std::move(text), {}, {}}); };
+  const auto add = [&](Severity severity, std::string text) {
+    row.remarks.push_back({severity, std::move(text), {}, {}});
+  };
   row.remarks = row.file.findings;
-  const bool isTold = std::ranges::any_of(
-      row.remarks, [](const Finding& finding) { return finding.severity == Severity::Error; });
+  const bool isTold =
+      std::ranges::any_of(row.remarks, [](const Finding& finding) { return finding.severity == Severity::Error; });
   if (!row.problem.empty() && !isTold) add(Severity::Error, row.problem);
   // Nodes of points have no validation.
   if (row.problem.empty() && row.file.use.kind == FileUse::Kind::Points && board_.request.domain.geometry)
@@ -407,8 +410,7 @@ void BoardMaker::Conclude(CoverageRow& row) {
   for (std::size_t i = 0; i < std::min(row.gaps.size(), kMostGaps); ++i)
     add(Severity::Warning, fmt::format("No values from {} to {}", DateInWords(DateAt(row.gaps[i].start)),
                                        DateInWords(DateAt(row.gaps[i].end))));
-  if (row.gaps.size() > kMostGaps)
-    add(Severity::Warning, fmt::format("And {} gaps more", row.gaps.size() - kMostGaps));
+  if (row.gaps.size() > kMostGaps) add(Severity::Warning, fmt::format("And {} gaps more", row.gaps.size() - kMostGaps));
   if (row.missing > 0) add(Severity::Warning, MissingCellsText(row));
   std::ranges::stable_sort(row.remarks, {}, &Finding::severity);
   row.state = CoverageState::Fine;

@@ -77,8 +77,8 @@ struct CoverageRow {
 
   std::optional<Envelope> extent;
   bool isInDegrees = false;
-  std::size_t cells = 0;    ///< Of the domain; 0 where none were asked for.
-  std::size_t missing = 0;  ///< Of these, without a value.
+  std::size_t cells = 0;                                           ///< Of the domain; 0 where none were asked for.
+  std::size_t missing = 0;                                         ///< Of these, without a value.
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> missingCells;  ///< 2 where one is missing, 1 in the others.
 
   std::vector<Finding> remarks;  ///< Of the node and of what was met here, the worst first.
@@ -97,8 +97,8 @@ struct ForcingTotals {
   TotalForm form;
   struct Column {
     std::string name;  ///< Of the station; "all" for one that serves all, "domain" for the mean over the area.
-    std::optional<double> share;   ///< Of the cells of the domain.
-    std::vector<PeriodSum> sums;   ///< One for each period.
+    std::optional<double> share;  ///< Of the cells of the domain.
+    std::vector<PeriodSum> sums;  ///< One for each period.
     std::string problem;
   };
   std::vector<Column> columns;
