@@ -70,7 +70,7 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
       fmt::print(out, "{}: {}: {}{}\n", NameOf(remark.severity), row.file.path, remark.text,
                  remark.detail.empty() ? "" : fmt::format(" ({})", remark.detail));
   for (const ForcingTotals& totals : board.forcings) {
-    fmt::print(out, "\n{}: {}\n", totals.forcing.path, totals.Heading());
+    fmt::print(out, "\n{}: {}; in brackets shares of domain and time\n", totals.forcing.path, totals.Heading());
     Rows table{{""}};
     for (std::size_t column = 0; column < totals.columns.size(); ++column)
       table.front().push_back(totals.ColumnText(column));
@@ -171,12 +171,13 @@ void WriteJson(const CoverageBoard& board, std::ostream& out) {
 int CoverageCommand(const std::string& file, bool json, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
-  const auto board = ComputeCoverage(AskCoverage(document.Root()), nullptr, {});
-  json ? WriteJson(*board, streams.out) : WriteText(*board, streams.out);
+  CoverageBoard board;
+  ComputeCoverage(AskCoverage(document.Root()), nullptr, board);
+  json ? WriteJson(board, streams.out) : WriteText(board, streams.out);
   const bool isCovered =
-      board->domain && board->request.simulation &&
-      std::ranges::all_of(board->rows, [](const CoverageRow& row) { return row.state <= CoverageState::Note; }) &&
-      std::ranges::all_of(board->forcings, [](const ForcingTotals& totals) {
+      board.domain && board.request.simulation &&
+      std::ranges::all_of(board.rows, [](const CoverageRow& row) { return row.state <= CoverageState::Note; }) &&
+      std::ranges::all_of(board.forcings, [](const ForcingTotals& totals) {
         return totals.remarks.empty() &&
                std::ranges::all_of(totals.columns, [](const auto& column) { return column.problem.empty(); });
       });

@@ -33,6 +33,8 @@ struct Finding {
   std::string text;
   std::string key;     ///< The key that it speaks of; may be empty.
   std::string detail;  ///< The reason behind a fixed text; may be empty.
+
+  bool operator==(const Finding&) const = default;
 };
 
 /// A line of the overview page.

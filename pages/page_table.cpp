@@ -6,6 +6,7 @@
 #include "document/pages.h"
 #include "exchange/overlays.h"
 #include "exchange/pages.h"
+#include "pages/document/coverage_page.h"
 #include "pages/document/document_pages.h"
 #include "pages/page.h"
 #include "pages/simspec/components_pages.h"
@@ -39,6 +40,7 @@ std::unique_ptr<CYbSEDlgBase> Make(CYbSEKvfBase& node, PageContext context) {
 const std::array kPages{
     PageRow{kHelpPage, Make<CTvnHelpView, CYbSEKvfBase>},
     PageRow{kOverviewPage, Make<COverviewDlg, COverviewKvf>},
+    PageRow{kCoveragePage, Make<CCoverageDlg, CCoverageKvf>},
     PageRow{kDisplayPage, Make<CDisplayDlg, COverlaysKvf>},
     PageRow{kCatchmentPage, Make<CCatchmentDlg, CCatchmentKvf>},
     PageRow{kData2DPage, Make<CData2DDlg, CData2DKvf>},

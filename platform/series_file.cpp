@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/series_file.h"
 
+#include <fmt/format.h>
+
 #include "platform/datafile_writer.h"
 #include "platform/units.h"
 

@@ -414,6 +414,8 @@ class ShownWidget : public ControlWidget {
     const QString value = Translated(Described().Text());
     const bool bearsLabel = Described().beside && !Described().label.empty();
     value_->setText(bearsLabel ? QString("%1: %2").arg(Translated(Described().label), value) : value);
+    // Several lines are a text to be read, however narrow the page is.
+    value_->setWordWrap(value.contains('\n'));
   }
 
  private:

@@ -68,17 +68,25 @@ std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
   return TimeSpan{start.SecondsSinceEpoch(), end.SecondsSinceEpoch()};
 }
 
-/// The quantity whose values a file gives: what its owner makes of it, or its grid as it is.
-std::optional<GridSource> ValuesOf(const CYbSEKvfBase& node, const FileUse& use) {
-  if (!use.isOverArea) return std::nullopt;
-  if (const auto* owner = dynamic_cast<const CellValues*>(node.GetParent())) return owner->CurrentSource();
-  if (use.kind != FileUse::Kind::Data) return std::nullopt;
-  GridSource source;
-  source.type = CData2DKvf::kGridFile;
-  source.file = use.path;
-  source.stamps = use.stamps;
-  source.item = use.item;
-  return source;
+CoverageFile AskFile(const NodePlace& place, FileUse use) {
+  CoverageFile file;
+  file.path = place.path;
+  file.serial = place.node.Serial();
+  file.title = TitleOf(place.node);
+  file.findings = place.node.Findings();
+  // What the owner makes of the file, or its grid as it is.
+  if (auto* owner = dynamic_cast<CellValues*>(place.node.GetParent()); owner && use.isOverArea) {
+    file.values = owner->CurrentSource();
+    file.grid = owner->GridComputation();
+  } else if (use.isOverArea && use.kind == FileUse::Kind::Data) {
+    GridSource& source = file.values.emplace();
+    source.type = CData2DKvf::kGridFile;
+    source.file = use.path;
+    source.stamps = use.stamps;
+    source.item = use.item;
+  }
+  file.use = std::move(use);
+  return file;
 }
 
 }  // namespace
@@ -90,9 +98,7 @@ CoverageRequest AskCoverage(CYbSEKvfBase& root) {
   WalkNodes(root, [&](const NodePlace& place) {
     if (!place.takesPart) return;
     if (const auto* user = dynamic_cast<const FileUser*>(&place.node))
-      if (std::optional<FileUse> use = user->UsedFile())
-        request.files.push_back({place.path, place.node.Serial(), TitleOf(place.node), *use, ValuesOf(place.node, *use),
-                                 place.node.Findings()});
+      if (std::optional<FileUse> use = user->UsedFile()) request.files.push_back(AskFile(place, *std::move(use)));
     if (const auto* forcing = dynamic_cast<const ForcingNode*>(&place.node))
       request.forcings.push_back({place.path, place.node.Serial(), forcing->CurrentForcing()});
   });
@@ -102,9 +108,6 @@ CoverageRequest AskCoverage(CYbSEKvfBase& root) {
 // ---- Computing
 
 namespace {
-
-/// Thrown to leave the computation of a board, with what was made of it.
-struct BoardCancelled {};
 
 /// A step of a file of grids, as a mean over the domain.
 class DomainMeans {
@@ -179,9 +182,10 @@ class BoardMaker {
 
   CoverageBoard Make() {
     MakePeriods();
+    part_ = progress_.Part(0, 1.0 / static_cast<double>(board_.request.files.size() + 2));
     MakeDomain();
-    const auto parts = static_cast<double>(board_.request.files.size() + board_.request.forcings.size());
-    double done = 0;
+    const auto parts = static_cast<double>(board_.request.files.size() + board_.request.forcings.size() + 1);
+    double done = 1;
     for (const CoverageFile& file : board_.request.files) {
       part_ = progress_.Part(done / parts, (done + 1) / parts);
       board_.rows.push_back(MakeRow(file));
@@ -203,9 +207,7 @@ class BoardMaker {
   }
 
  private:
-  void LeaveIfCancelled() const {
-    if (progress_.IsCancelled()) throw BoardCancelled();
-  }
+  void LeaveIfCancelled() const { progress_.ThrowIfCancelled(); }
   bool IsOfSameSetting() const {
     return previous_ && previous_->request.simulation == board_.request.simulation &&
            previous_->request.domain == board_.request.domain;
@@ -272,8 +274,8 @@ void BoardMaker::MakeDomain() {
   }
   auto grid = std::make_shared<GridData>();
   const FileResult result =
-      source.isShape ? grid->MakeCatchmentGriddataFromShapefile(source.file, source.axisUnit, *source.geometry)
-                     : ReadGridData(source.file, source.item, *grid);
+      source.isShape ? grid->MakeCatchmentGriddataFromShapefile(source.file, source.axisUnit, *source.geometry, part_)
+                     : ReadGridData(source.file, source.item, *grid, part_);
   LeaveIfCancelled();
   board_.domainProblem = result.error;
   if (!result.Ok()) return;
@@ -324,7 +326,9 @@ void BoardMaker::ReadData(CoverageRow& row) {
   row.problem = facts->error.empty() ? facts->WhyNoItem(use.item) : facts->error;
   if (!row.problem.empty()) return;
   const DataItem& item = *facts->Item(use.item);
-  row.item = item.unitText.empty() ? item.name : fmt::format("{} [{}]", item.name, item.unitText);
+  const Unit* unit = FindUnit(item.unitKey);
+  const std::string_view unitText = unit && !unit->abbreviation.empty() ? unit->abbreviation : item.unitText;
+  row.item = unitText.empty() ? item.name : fmt::format("{} [{}]", item.name, unitText);
   if (!item.hasTime || facts->time.stamps.empty()) return;
   row.steps = facts->time.stamps.size();
   row.period = TimeSpan{StartOfValues(item, facts->time).SecondsSinceEpoch(), facts->time.stamps.back()};
@@ -364,14 +368,15 @@ void BoardMaker::LookForCells(CoverageRow& row) {
     row.gaps = grids.facts.gaps;
     isMissing = grids.wasMissing;
   } else {
-    GridData grid;
-    InterpolationOptions work;
-    work.threads = 2;
-    const FileResult result = BuildGrid(source, work, grid);
+    std::shared_ptr<ComputedGrid> made = row.file.grid;
+    if (!made)
+      made = std::make_shared<ComputedGrid>(
+          std::string(), [source](GridData& grid, ProgressPart progress) { return BuildGrid(source, progress, grid); });
+    made->Run(part_);
     LeaveIfCancelled();
-    row.problem = result.error;
-    if (result.Ok()) {
-      const std::vector<float> values = Resample(grid, board_.domain->Geometry(), Resampling::Nearest);
+    row.problem = made->Problem();
+    if (made->Result()) {
+      const std::vector<float> values = Resample(*made->Result(), board_.domain->Geometry(), Resampling::Nearest);
       for (std::size_t i = 0; i < values.size(); ++i)
         if (!board_.domain->IsEmptyValue(board_.domain->Values()[i]))
           isMissing.push_back(values[i] == kUsualDeleteValue);
@@ -558,9 +563,9 @@ AreaCells BoardMaker::CellsOf(const GridSource& source) {
   const bool isPolygons = source.type == CData2DKvf::kShapeFile;
   if (isPolygons) {
     const PolygonFile polygons{source.file, source.attribute, source.gapFill, source.axisUnit};
-    result = grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones);
+    result = grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, part_);
   } else {
-    result = ReadGridData(source.file, source.item, grid);
+    result = ReadGridData(source.file, source.item, grid, part_);
   }
   LeaveIfCancelled();
   cells.problem = result.error;
@@ -582,13 +587,14 @@ AreaCells BoardMaker::CellsOf(const GridSource& source) {
 
 }  // namespace
 
-std::shared_ptr<const CoverageBoard> ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous,
-                                                     ProgressPart progress) {
+FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous, CoverageBoard& board,
+                           ProgressPart progress) {
   try {
-    return std::make_shared<const CoverageBoard>(BoardMaker(request, previous, progress).Make());
-  } catch (const BoardCancelled&) {
-    return nullptr;
+    board = BoardMaker(request, previous, progress).Make();
+  } catch (const Cancelled&) {
+    return {kCancelled, {}};
   }
+  return {};
 }
 
 // ---- In words
@@ -621,7 +627,7 @@ std::string ForcingTotals::ValueText(std::size_t column, std::size_t period, con
   if (period >= c.sums.size() || c.sums[period].covered == 0) return {};
   std::string text = FormatNumber(form.Of(c.sums[period]), "%.5g");
   const double share = static_cast<double>(c.sums[period].covered) / static_cast<double>(span.Seconds());
-  if (share < 1) text += fmt::format(" ({:.{}f}% of the time)", share * 100, share > 0.995 ? 2 : 0);
+  if (share < 1) text += fmt::format(" ({:.{}f}%)", share * 100, share > 0.995 ? 2 : 0);
   return text;
 }
 

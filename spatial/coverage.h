@@ -27,14 +27,19 @@ struct CoverageFile {
   std::uint64_t serial = 0;  ///< Of its node.
   std::string title;         ///< What it holds: "Topography", "Precipitation Rate: Sion".
   FileUse use;
-  std::optional<GridSource> values;  ///< The quantity that is to have a value in every cell of the domain.
-  std::vector<Finding> findings;     ///< Of its node.
+  std::optional<GridSource> values;         ///< The quantity that is to have a value in every cell of the domain.
+  std::vector<Finding> findings;            ///< Of its node.
+  std::shared_ptr<ComputedGrid> grid = {};  ///< Of the quantity, where its node keeps it.
+
+  bool operator==(const CoverageFile&) const = default;
 };
 
 struct CoverageForcing {
   std::string path;
   std::uint64_t serial = 0;
   Forcing forcing;
+
+  bool operator==(const CoverageForcing&) const = default;
 };
 
 /// Where the domain is read from.
@@ -54,6 +59,8 @@ struct CoverageRequest {
   DomainSource domain;
   std::vector<CoverageFile> files;
   std::vector<CoverageForcing> forcings;
+
+  bool operator==(const CoverageRequest&) const = default;
 };
 /// Asks the nodes that take part, as of the latest validation. Reads no values.
 CoverageRequest AskCoverage(CYbSEKvfBase& root);
@@ -108,7 +115,7 @@ struct ForcingTotals {
   std::string Heading() const;
   /// "Sion (12%)": with the share of the domain where it is known.
   std::string ColumnText(std::size_t column) const;
-  /// "1106", "512 (56% of the time)", or empty where nothing is known.
+  /// "1106", "512 (56%)" with the share of the time that has values, or empty where nothing is known.
   std::string ValueText(std::size_t column, std::size_t period, const TimeSpan& span) const;
 };
 
@@ -128,9 +135,9 @@ struct CoverageBoard {
   std::vector<ForcingTotals> forcings;
 };
 
-/// Computes the board; what `previous` answers to the same question is taken from it. Null when it was cancelled.
-std::shared_ptr<const CoverageBoard> ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous,
-                                                     ProgressPart progress);
+/// Computes the board; what `previous` answers to the same question is taken from it. An error is "cancelled" alone.
+FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous, CoverageBoard& board,
+                           ProgressPart progress = {});
 
 /// "312 cells of the domain have no topography"; empty when all have one.
 std::string MissingCellsText(const CoverageRow& row);

@@ -69,7 +69,7 @@ class CData2DKvf : public CTvnKvfBase, public CellValues {
   GridSource CurrentSource() const override;
   /// The building of the grid: another one when what decides the grid has changed; null for a uniform value. It asks no
   /// node.
-  std::shared_ptr<ComputedGrid> GridComputation();
+  std::shared_ptr<ComputedGrid> GridComputation() override;
   /// The grid, built here and now if it is not there yet; null for a uniform value and where it cannot be built, and
   /// then `problem` says why.
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> GetGridData(std::string* problem = nullptr);

@@ -5,12 +5,14 @@
 // node. All are copies of values: another thread may work on them.
 #pragma once
 
+#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
 #include "platform/files.h"
 #include "platform/grid.h"
+#include "platform/grid_files.h"
 
 namespace tervane {
 
@@ -60,6 +62,8 @@ class CellValues {
   virtual ~CellValues() = default;
   /// What decides the grid now.
   virtual GridSource CurrentSource() const = 0;
+  /// The building of the grid, where the node keeps it for all who ask; else null.
+  virtual std::shared_ptr<ComputedGrid> GridComputation() { return nullptr; }
 };
 
 /// A constant, or an item of a file over time.

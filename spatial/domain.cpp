@@ -69,7 +69,7 @@ std::shared_ptr<CTvn2DOrthoRotatedGridData> CCatchmentKvf::GetDomainFromShape(st
 
 CCatchmentKvf::ShapeSource CCatchmentKvf::CurrentShape() const {
   const std::string file = shapeFile_->File.Absolute();
-  return {file, StampOf(file), ShapeAxisUnit, {nxShp, nyShp, sizeShp, x0Shp, y0Shp, rotationShp, MapProjShp}};
+  return {file, StampsOfShape(file), ShapeAxisUnit, {nxShp, nyShp, sizeShp, x0Shp, y0Shp, rotationShp, MapProjShp}};
 }
 
 FileResult CCatchmentKvf::BuildFromShape(const ShapeSource& source, ProgressPart progress,

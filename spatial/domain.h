@@ -66,7 +66,7 @@ class CCatchmentKvf : public CTvnKvfBase {
   /// All that decides the domain of a shape file.
   struct ShapeSource {
     std::string file;
-    FileStamp stamp;
+    std::vector<FileStamp> stamps;
     int axisUnit = 0;
     GridGeometry geometry;
 

@@ -69,7 +69,9 @@ class Coverage : public testing::Test {
   }
   std::shared_ptr<const CoverageBoard> Board(const CoverageBoard* previous = nullptr) {
     document_.Root().Validate();
-    return ComputeCoverage(AskCoverage(document_.Root()), previous, {});
+    auto board = std::make_shared<CoverageBoard>();
+    EXPECT_EQ(ComputeCoverage(AskCoverage(document_.Root()), previous, *board).error, "");
+    return board;
   }
   /// The row of a file by its name.
   static const CoverageRow& RowOf(const CoverageBoard& board, const std::string& file) {
@@ -172,7 +174,8 @@ TEST_F(Coverage, WeighsStationsByTheirShareOfTheDomain) {
   EXPECT_THAT(valuesOf(0), ElementsAre(366, 365, 365));
   EXPECT_THAT(valuesOf(1), ElementsAre(4 * 366, 4 * 365, 4 * 365));
   // A third of the area that has a station is the west's.
-  EXPECT_THAT(valuesOf(2), ElementsAre(testing::DoubleEq(3 * 366), testing::DoubleEq(3 * 365), 3 * 365));
+  EXPECT_THAT(valuesOf(2),
+              ElementsAre(testing::DoubleEq(3 * 366), testing::DoubleEq(3 * 365), testing::DoubleEq(3 * 365)));
   EXPECT_DOUBLE_EQ(*found->columns[0].share, 0.3);
   EXPECT_THAT(found->remarks, ElementsAre("10 cells of the domain belong to no station"));
   EXPECT_EQ(RowOf(*board, "stations.shp").missing, 10U);
@@ -196,7 +199,8 @@ TEST_F(Coverage, TakesWhatStayedTheSameFromTheBoardBefore) {
 
   Progress progress;
   progress.Cancel();
-  EXPECT_EQ(ComputeCoverage(AskCoverage(document_.Root()), nullptr, progress), nullptr);
+  CoverageBoard cancelled;
+  EXPECT_EQ(ComputeCoverage(AskCoverage(document_.Root()), nullptr, cancelled, progress).error, kCancelled);
 }
 
 }  // namespace

@@ -42,7 +42,7 @@ SeriesFacts Sum(const Values& values) {
 TEST(SeriesTotals, FollowTheKindOfValue) {
   struct Row {
     Values values;
-    double first, second;          ///< Integrals in unit times days.
+    double first, second;          ///< Integrals in unit times days; of what is counted over steps the amount.
     double firstDays, secondDays;  ///< Covered.
   };
   const Row rows[] = {
@@ -64,8 +64,9 @@ TEST(SeriesTotals, FollowTheKindOfValue) {
     ASSERT_EQ(facts.error, "");
     ASSERT_EQ(facts.sums.size(), 2U);
     const double day = static_cast<double>(kDay);
-    EXPECT_NEAR(facts.sums[0].integral / day, row.first, 1e-9);
-    EXPECT_NEAR(facts.sums[1].integral / day, row.second, 1e-9);
+    const bool isAmount = row.values.type == ValueType::StepAccumulated || row.values.type == ValueType::Accumulated;
+    EXPECT_NEAR(facts.sums[0].integral / (isAmount ? 1 : day), row.first, 1e-9);
+    EXPECT_NEAR(facts.sums[1].integral / (isAmount ? 1 : day), row.second, 1e-9);
     EXPECT_NEAR(static_cast<double>(facts.sums[0].covered) / day, row.firstDays, 1e-9);
     EXPECT_NEAR(static_cast<double>(facts.sums[1].covered) / day, row.secondDays, 1e-9);
   }
