@@ -14,7 +14,6 @@
 #include "platform/datafile_request.h"
 #include "platform/grid_files.h"
 #include "platform/grid_polygons.h"
-#include "platform/grid_resample.h"
 #include "platform/shapes.h"
 #include "platform/text.h"
 #include "simspec/periods.h"
@@ -109,6 +108,32 @@ CoverageRequest AskCoverage(CYbSEKvfBase& root) {
 
 namespace {
 
+/// For each cell of the domain the place of the cell of another grid in which its centre lies; -1 off that grid.
+std::vector<std::ptrdiff_t> PlacesOf(const GridData& domain, const GridGeometry& grid) {
+  const GridTransform own(grid);
+  const GridGeometry& cells = domain.Geometry();
+  std::vector<std::ptrdiff_t> places;
+  for (int j = 0; j < cells.ny; ++j) {
+    for (int i = 0; i < cells.nx; ++i) {
+      if (domain.IsEmptyValue(domain.Value(i, j))) continue;
+      const MapPoint at = own.ToCells(domain.CellCentre(i, j));
+      const bool isInside = at.x >= 0 && at.y >= 0 && at.x < grid.nx && at.y < grid.ny;
+      places.push_back(isInside ? static_cast<std::ptrdiff_t>(at.y) * grid.nx + static_cast<std::ptrdiff_t>(at.x) : -1);
+    }
+  }
+  return places;
+}
+
+/// The values of a grid in the cells of the domain; nothing where there is none.
+std::vector<std::optional<float>> ValuesIn(const GridData& domain, const GridData& grid) {
+  std::vector<std::optional<float>> values;
+  for (const std::ptrdiff_t place : PlacesOf(domain, grid.Geometry())) {
+    const float value = place < 0 ? grid.DeleteValue() : grid.Values()[static_cast<std::size_t>(place)];
+    values.push_back(grid.IsEmptyValue(value) ? std::nullopt : std::optional(value));
+  }
+  return values;
+}
+
 /// A step of a file of grids, as a mean over the domain.
 class DomainMeans {
  public:
@@ -121,16 +146,7 @@ class DomainMeans {
         watched_(watched),
         wasMissing_(wasMissing) {
     const FileGeometry& g = item_.geometry;
-    const GridTransform own({g.nx, g.ny, g.IsPlaced() ? g.cellSize : 1.0, g.x0, g.y0, g.rotation, g.projection});
-    const GridGeometry& cells = domain.Geometry();
-    for (int j = 0; j < cells.ny; ++j) {
-      for (int i = 0; i < cells.nx; ++i) {
-        if (domain.IsEmptyValue(domain.Value(i, j))) continue;
-        const MapPoint at = own.ToCells(domain.CellCentre(i, j));
-        const bool isInside = at.x >= 0 && at.y >= 0 && at.x < g.nx && at.y < g.ny;
-        places_.push_back(isInside ? static_cast<std::ptrdiff_t>(at.y) * g.nx + static_cast<std::ptrdiff_t>(at.x) : -1);
-      }
-    }
+    places_ = PlacesOf(domain, {g.nx, g.ny, g.IsPlaced() ? g.cellSize : 1.0, g.x0, g.y0, g.rotation, g.projection});
     wasMissing_.assign(places_.size(), false);
     values_.resize(item_.CellsOfLayer());
   }
@@ -376,10 +392,7 @@ void BoardMaker::LookForCells(CoverageRow& row) {
     LeaveIfCancelled();
     row.problem = made->Problem();
     if (made->Result()) {
-      const std::vector<float> values = Resample(*made->Result(), board_.domain->Geometry(), Resampling::Nearest);
-      for (std::size_t i = 0; i < values.size(); ++i)
-        if (!board_.domain->IsEmptyValue(board_.domain->Values()[i]))
-          isMissing.push_back(values[i] == kUsualDeleteValue);
+      for (const std::optional<float>& value : ValuesIn(*board_.domain, *made->Result())) isMissing.push_back(!value);
     }
   }
   if (row.problem.empty()) TakeMissing(row, isMissing);
@@ -572,14 +585,12 @@ AreaCells BoardMaker::CellsOf(const GridSource& source) {
   if (!result.Ok()) return cells;
   std::map<int, std::string> idOfCode;
   for (const ZoneTable::Zone& zone : zones.zones) idOfCode[zone.code] = zone.text;
-  const std::vector<float> codes = Resample(grid, board_.domain->Geometry(), Resampling::Nearest);
-  for (std::size_t i = 0; i < codes.size(); ++i) {
-    if (board_.domain->IsEmptyValue(board_.domain->Values()[i])) continue;
-    if (codes[i] == kUsualDeleteValue) {
+  for (const std::optional<float>& value : ValuesIn(*board_.domain, grid)) {
+    if (!value) {
       ++cells.withoutId;
       continue;
     }
-    const int code = static_cast<int>(std::lround(codes[i]));
+    const int code = static_cast<int>(std::lround(*value));
     ++cells.cellsOfId[isPolygons ? idOfCode[code] : std::to_string(code)];
   }
   return cells;
