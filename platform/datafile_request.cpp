@@ -6,6 +6,8 @@
 
 #include <fmt/format.h>
 
+#include "platform/text.h"
+
 namespace tervane {
 
 namespace {
@@ -30,6 +32,19 @@ std::string WhyTypeIsWrong(int number, const DataItem& item, const std::vector<i
   return fmt::format("item {} {}, {} was expected", number,
                      item.itemType == kUndefinedItemType ? "has no item type" : "is " + NameOfItemType(item.itemType),
                      names);
+}
+
+/// Why an item cannot be converted to its quantity, or stands on cells that no grid here has.
+std::string WhyValuesAreUnfit(int number, const DataItem& item, const DataFileRequest& request) {
+  const ItemType* type = request.itemTypes.empty() ? nullptr : FindItemType(item.itemType);
+  if (type && type->code != kUndefinedItemType &&
+      (!item.scale || item.scale->dimension != BaseUnit(*type).scale.dimension))
+    return fmt::format("item {} is in \"{}\", which is no unit of {}", number, item.unitText, type->name);
+  const FileGeometry& g = item.geometry;
+  if (item.dimensions >= 2 && !g.HasSquareCells())
+    return fmt::format("item {} has cells of {} x {}, square ones were expected; resample the grid", number,
+                       ShortestNumber(g.cellSize), ShortestNumber(g.cellHeight));
+  return {};
 }
 
 std::string Plural(std::size_t count, std::string_view one, std::string_view many) {
@@ -69,6 +84,7 @@ std::string WhyNotMet(const DataFileFacts& file, std::span<const int> items, con
                          KindOf(*request.dimensions));
     }
     if (std::string reason = WhyTypeIsWrong(number, item, request.itemTypes); !reason.empty()) return reason;
+    if (std::string reason = WhyValuesAreUnfit(number, item, request); !reason.empty()) return reason;
     const std::size_t steps = item.hasTime ? file.time.steps : 1;
     if (request.steps && steps != *request.steps) {
       return fmt::format("the file has {}, {} expected", Plural(steps, "time step", "time steps"),

@@ -24,8 +24,7 @@ std::string WhyNoGrid(const std::string& path, const std::vector<DataItem>& item
   const DataItem& item = items[static_cast<std::size_t>(number - 1)];
   if (item.dimensions < 2) return fmt::format("{}: item {} is no grid", path, number);
   const FileGeometry& g = item.geometry;
-  constexpr double kSlack = 1e-3;
-  if (std::abs(g.cellHeight - g.cellSize) > kSlack * g.cellSize)
+  if (!g.HasSquareCells())
     return fmt::format("{}: item {} has cells of {} x {}, square ones are expected; resample the grid", path, number,
                        ShortestNumber(g.cellSize), ShortestNumber(g.cellHeight));
   return {};

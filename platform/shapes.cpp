@@ -15,6 +15,7 @@
 
 #include "platform/file_cache.h"
 #include "platform/paths.h"
+#include "platform/ring_faults.h"
 #include "platform/shapelib_memory.h"
 #include "platform/text.h"
 #include "platform/text_fields.h"
@@ -239,7 +240,12 @@ class ShapeFileReader {
 
   Reason ReadShape(int number, const UnitConversion& toMetres, Shape& shape) {
     const ObjectHandle object(SHPReadObject(handle_.get(), number));
-    if (!object || !files_.firstMessage.empty()) return Message("it is damaged");
+    if (!object || !files_.firstMessage.empty()) {
+      Reason reason = Message("it is damaged");
+      // The library counts shapes from 0 and cuts its sentence.
+      const bool isCount = reason.starts_with("Corrupted .shp file");
+      return isCount ? "it is damaged: its numbers of parts and points do not fit its length" : reason;
+    }
     if (object->nSHPType == SHPT_NULL) return {};
     if (object->nSHPType != handle_->nShapeType) {
       return fmt::format("it is of the type {}, the file of the type {}", SHPTypeName(object->nSHPType),
@@ -375,6 +381,8 @@ ShapeFacts ReadFacts(const std::string& path) {
   facts.tableProblem = reader.tableProblem.empty() ? reader.WhyTableDiffers() : reader.tableProblem;
   facts.note = std::move(reader.note);
   facts.kind = reader.kind;
+  if (facts.kind == ShapeKind::Polygon)
+    if (const std::string fault = FirstRingFault(reader.shapes); !fault.empty()) AddNote(facts.note, fault);
   facts.fields = std::move(reader.fields);
   facts.projection = std::move(reader.projection);
   facts.shapes = reader.shapes.size();

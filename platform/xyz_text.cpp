@@ -38,6 +38,19 @@ bool BeginsWithNumber(std::string_view line, FieldRules rules) {
   return ReadNumber(NextField(line, rules), rules, number);
 }
 
+/// True for "330000,5 5090000,5 12,5": blanks separate at least three fields, and no comma stands at a blank.
+bool HasCommasInsideNumbers(std::string_view line) {
+  if (line.find(',') == std::string_view::npos) return false;
+  int fields = 0;
+  for (std::string_view rest = Trimmed(line); !rest.empty(); rest = Trimmed(rest)) {
+    const std::string_view field = rest.substr(0, rest.find_first_of(" \t"));
+    if (field.front() == ',' || field.back() == ',') return false;
+    rest.remove_prefix(field.size());
+    ++fields;
+  }
+  return fields >= 3;
+}
+
 FileResult ParseLines(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points,
                       ProgressPart progress) {
   if (const std::string reason = WhyNoText(text); !reason.empty()) {
@@ -51,7 +64,7 @@ FileResult ParseLines(std::string_view text, const std::string& path, std::vecto
     told.After(lines);
     if (IsComment(Trimmed(line))) continue;
     if (points.empty()) {
-      rules.isCommaDecimal = line.find(';') != std::string_view::npos;
+      rules.isCommaDecimal = line.find(';') != std::string_view::npos || HasCommasInsideNumbers(line);
       if (!BeginsWithNumber(line, rules)) continue;
       // The length of the first point tells about how many there are, so that the list seldom grows.
       points.reserve(text.size() / (line.size() + 1) + 1);

@@ -23,9 +23,10 @@ struct ScatteredPoint {
 };
 
 /// Reads a text of points, in the file's own units. Fields stand apart by blanks, tabs, commas or semicolons; where the
-/// first point has a semicolon, a comma is the decimal mark. Whatever stands before the first point and does not begin
-/// with a number is a heading; empty lines and lines that begin with `#`, `!` or `%` are left out everywhere. Columns
-/// behind the third are not read. Errors name file and line; then `points` is empty.
+/// first point has a semicolon, or blanks between numbers with a comma inside, a comma is the decimal mark. Whatever
+/// stands before the first point and does not begin with a number is a heading; empty lines and lines that begin with
+/// `#`, `!` or `%` are left out everywhere. Columns behind the third are not read. Errors name file and line; then
+/// `points` is empty.
 FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& points, ProgressPart progress = {});
 
 /// The same of a text; `path` stands in the messages.

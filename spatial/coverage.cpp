@@ -345,6 +345,8 @@ void BoardMaker::ReadData(CoverageRow& row) {
   const Unit* unit = FindUnit(item.unitKey);
   const std::string_view unitText = unit && !unit->abbreviation.empty() ? unit->abbreviation : item.unitText;
   row.item = unitText.empty() ? item.name : fmt::format("{} [{}]", item.name, unitText);
+  if (item.hasTime && use.isOverTime && facts->time.stamps.empty())
+    row.problem = facts->time.steps == 0 ? "the file has no time steps" : "the file has no dates";
   if (!item.hasTime || facts->time.stamps.empty()) return;
   row.steps = facts->time.stamps.size();
   row.period = TimeSpan{StartOfValues(item, facts->time).SecondsSinceEpoch(), facts->time.stamps.back()};
@@ -369,7 +371,7 @@ void BoardMaker::ReadPoints(CoverageRow& row) {
   const auto facts = XyzFactsOf(row.file.use.path);
   row.problem = facts->error;
   if (!row.problem.empty()) return;
-  row.item = fmt::format("{} points", facts->points);
+  row.item = facts->points == 1 ? "1 point" : fmt::format("{} points", facts->points);
 }
 
 void BoardMaker::LookForCells(CoverageRow& row) {

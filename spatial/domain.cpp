@@ -143,7 +143,10 @@ int CCatchmentKvf::ValidateData() {
     }
   }
   if (auto* maps = dynamic_cast<DomainFollower*>(ImportantNode("OVERLAY_DATA"))) maps->AdoptDomain(GetEnvelope());
-  const std::string projection = GetModelGeometry().projection;
+  const GridGeometry geometry = GetModelGeometry();
+  if (const std::string problem = geometry.Problem(); !problem.empty())
+    AddWarning("The grid of the model cannot be made", Type == kShapeFile ? "nxShp" : "FILE_NAME", problem);
+  const std::string& projection = geometry.projection;
   if (CYbMapProjection(projection).IsGeographical()) {
     AddError(projection + " is not supported by Tervane. Only projected coordinate systems are allowed", "MapProjShp");
     return 0;

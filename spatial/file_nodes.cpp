@@ -89,11 +89,14 @@ void CData2DShpFile::Choose(FileName file, std::string attribute) {
 
 int CData2DShpFile::ValidateData() {
   if (ValidateFlag == 0) return 1;
-  const std::string reason = File.IsEmpty() ? kNoFile : CheckShapeFile(File.Absolute(), request_, Attribute()).error;
-  if (!reason.empty()) {
-    AddError(kNotValid, "FILE_NAME", reason);
+  const FileResult checked =
+      File.IsEmpty() ? FileResult{kNoFile, {}} : CheckShapeFile(File.Absolute(), request_, Attribute());
+  if (!checked.Ok()) {
+    AddError(kNotValid, "FILE_NAME", checked.error);
     return 0;
   }
+  if (!checked.note.empty())
+    AddFinding({Severity::Note, "The file was read with reservations", "FILE_NAME", checked.note});
   for (Finding& finding : MisplacementOf(*this, *UsedFile())) AddFinding(std::move(finding));
   return 1;
 }

@@ -28,7 +28,9 @@ FilePlace PlaceOfItem(const std::string& path, int number) {
   FilePlace place;
   const auto facts = DataFileFactsOf(path);
   const DataItem* item = facts->Item(number);
-  if (!item || item->dimensions < 2 || !item->geometry.IsPlaced()) return place;
+  if (!item || item->dimensions < 2) return place;
+  place.isUnplaced = !item->geometry.IsPlaced();
+  if (place.isUnplaced) return place;
   const FileGeometry& g = item->geometry;
   place.isKnown = true;
   place.extent = EnvelopeOf({g.nx, g.ny, g.cellSize, g.x0, g.y0, g.rotation, {}});
@@ -86,14 +88,18 @@ std::optional<GridGeometry> DomainGeometryOf(const CYbSEKvfBase& node) {
 
 std::vector<Finding> FindMisplacement(const FilePlace& place, const GridGeometry& domain) {
   std::vector<Finding> findings;
-  if (!place.isKnown) return findings;
   const auto add = [&](Severity severity, const char* text, std::string detail) {
     findings.push_back({severity, text, "FILE_NAME", std::move(detail)});
   };
+  if (place.isUnplaced)
+    add(Severity::Warning, "The file does not tell where its grid lies",
+        "it is taken to begin at 0, 0 with cells of 1 m; give its rows and columns coordinates");
+  if (!place.isKnown) return findings;
   if (place.isGeographical) {
     // Degrees and metres have no place in common that could be compared.
     add(Severity::Warning, "The coordinates of the file are in degrees",
-        fmt::format("its system is {}; transform it to {}, that of the model domain", NameOf(place.projection),
+        fmt::format("{}; transform it to {}, the system of the model domain",
+                    place.projection.empty() ? "its system is not told" : "its system is " + NameOf(place.projection),
                     NameOf(domain.projection)));
     return findings;
   }

@@ -19,6 +19,7 @@ struct FilePlace {
   bool isKnown = false;            ///< The file can be read, and its values have a place.
   std::optional<Envelope> extent;  ///< In metres, or degrees where `isGeographical`.
   bool isGeographical = false;
+  bool isUnplaced = false;     ///< It can be read, but does not tell where its cells lie.
   std::string projection;      ///< Its text; empty where the file tells none.
   std::string projectionFile;  ///< The file that would tell it and is not there; empty for others.
 };

@@ -185,7 +185,9 @@ std::string CCoverageDlg::RemarksText() const {
   if (!board_) return {};
   for (const CoverageRow& row : board_->rows)
     if (row.file.path == chosen_)
-      return fmt::format("{}, {}:\n{}", row.file.title, FileNameOf(row.file.use.path), TextOf(row));
+
+      return fmt::format("{}{}{}:\n{}", row.file.title, row.file.use.path.empty() ? "" : ", ",
+                         FileNameOf(row.file.use.path), TextOf(row));
   for (const ForcingTotals& totals : board_->forcings)
     if (totals.forcing.path == chosen_) return TextOf(totals);
   return "no data file is in use";

@@ -101,5 +101,15 @@ TEST_F(Placement, OfAGridFileIsHeldAgainstTheDomain) {
   EXPECT_EQ(FindingsOf(topography.GridFile()), "");
 }
 
+TEST(PlacementOfFiles, WithoutAPlaceIsAWarning) {
+  FilePlace place;
+  EXPECT_TRUE(FindMisplacement(place, {10, 10, 100, 0, 0, 0, {}}).empty()) << "the file cannot be read";
+  place.isUnplaced = true;
+  const std::vector<Finding> findings = FindMisplacement(place, {10, 10, 100, 0, 0, 0, {}});
+  ASSERT_EQ(findings.size(), 1U);
+  EXPECT_EQ(findings[0].severity, Severity::Warning);
+  EXPECT_EQ(findings[0].text, "The file does not tell where its grid lies");
+}
+
 }  // namespace
 }  // namespace tervane
