@@ -21,6 +21,7 @@
 #include "platform/grid.h"
 #include "platform/grid_interpolation.h"
 #include "platform/grid_polygons.h"
+#include "spatial/domain_boundary.h"
 
 namespace tervane::bench {
 namespace {
@@ -239,6 +240,50 @@ void PrintCodes(const char* what, const std::vector<float>& values) {
              ownTime, numpyTime, ownTime / numpyTime, Verdict(ownTime / numpyTime, 0.2));
 }
 
+// ---- Boundary
+
+/// A domain over nearly the whole large grid, with a jagged boundary.
+std::vector<float> JaggedDomain() {
+  std::mt19937 random(4);
+  std::uniform_real_distribution<double> radius(0.45 * kLargeSide, 0.49 * kLargeSide);
+  constexpr int kCorners = 20'000;
+  Shape shape;
+  for (int i = 0; i < kCorners; ++i) {
+    const double angle = -2 * std::acos(-1.0) * i / kCorners, r = radius(random);
+    shape.points.push_back({kLargeSide / 2.0 + r * std::cos(angle), kLargeSide / 2.0 + r * std::sin(angle)});
+  }
+  shape.points.push_back(shape.points.front());
+  shape.parts = {0};
+  return DomainOfPolygons({shape}, kLarge);
+}
+
+/// The time of tracing the boundary, for a smooth and a jagged one.
+void PrintTrace() {
+  constexpr double kLimit = 500;
+  std::vector<float> square(kLarge.CellCount(), 1.0F);
+  for (std::size_t i = 0; i < kLargeSide; ++i)
+    for (const std::size_t cell :
+         {i, (kLargeSide - 1) * std::size_t{kLargeSide} + i, i * kLargeSide, i * kLargeSide + kLargeSide - 1})
+      square[cell] = 2.0F;
+  for (const auto& [what, values] : {std::pair{"square", square}, std::pair{"jagged", JaggedDomain()}}) {
+    std::vector<double> times;
+    std::size_t cells = 0;
+    std::string message;
+    int isTraced = 1;
+    for (int k = 0; k < 5; ++k) {
+      CGeoDataBoundCondCatchmentData domain;
+      if (!domain.TakeValues(kLarge, values, kUsualDeleteValue, 0, kCodeItemType).empty()) return;
+      const std::clock_t start = std::clock();
+      isTraced = domain.PrepareBoundary(message);
+      times.push_back(1000.0 * static_cast<double>(std::clock() - start) / CLOCKS_PER_SEC);
+      cells = domain.BoundaryCells.size();
+    }
+    std::sort(times.begin(), times.end());
+    fmt::print("boundary trace, {}: {} cells in {:.1f} ms of at most {} ms{}  {}\n", what, cells, times[2], kLimit,
+               isTraced ? "" : " (refused: " + message + ")", Verdict(times[2], kLimit));
+  }
+}
+
 int Run(int argc, char** argv) {
   GDALAllRegister();
   // One thread each: the times are those of the processor.
@@ -264,6 +309,8 @@ int Run(int argc, char** argv) {
     for (float& value : ours->values) value = static_cast<float>(random() % 3000);
     PrintCodes("every cell another", ours->values);
   }
+
+  PrintTrace();
 
   MedianTable table(5);
   table.Add("inverse distance squared",

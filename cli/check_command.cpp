@@ -1,5 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <algorithm>
 #include <vector>
 
 #include <fmt/format.h>
@@ -74,7 +75,7 @@ int CheckCommand(const std::string& file, bool json, Streams streams) {
     WriteJson(findings, streams.out);
   else
     WriteText(file, findings, streams.out);
-  return findings.empty() ? kDone : kFindings;
+  return std::ranges::any_of(findings, NeedsAttention) ? kFindings : kDone;
 }
 
 }  // namespace tervane

@@ -18,7 +18,7 @@ namespace {
 /// What the user typed.
 struct Typed {
   std::string file, secondFile, path, value;
-  bool all = false, force = false, json = false, markdown = false, paths = false;
+  bool all = false, coverage = false, force = false, json = false, markdown = false, paths = false;
 };
 
 }  // namespace
@@ -51,9 +51,14 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
       command("new", "Write a setup with all defaults", [&] { return NewCommand(typed.file, typed.force, streams); }));
   create->add_flag("--force", typed.force, "Replace a file that exists, also where an editor has it open");
 
-  CLI::App* check = withFile(command("check", "List errors, warnings, notes and what the file holds that nothing reads",
-                                     [&] { return CheckCommand(typed.file, typed.json, streams); }));
+  CLI::App* check =
+      withFile(command("check", "List errors, warnings, notes and what the file holds that nothing reads", [&] {
+        return typed.coverage ? CoverageCommand(typed.file, typed.json, streams)
+                              : CheckCommand(typed.file, typed.json, streams);
+      }));
   check->add_flag("--json", typed.json, "As JSON");
+  check->add_flag("--coverage", typed.coverage,
+                  "Instead, how the data cover simulation and domain, and what the forcings come to each year");
 
   CLI::App* tree = withFile(command("tree", "List the nodes that take part", [&] {
     const TreeForm form = typed.json ? TreeForm::Json : typed.paths ? TreeForm::Paths : TreeForm::Text;

@@ -29,6 +29,8 @@ int NewCommand(const std::string& file, bool force, Streams streams);
 int ConvertCommand(const std::string& in, const std::string& out, bool force, Streams streams);
 
 int CheckCommand(const std::string& file, bool json, Streams streams);
+/// Whether the data cover the simulation and the domain, and what the forcings come to.
+int CoverageCommand(const std::string& file, bool json, Streams streams);
 
 enum class TreeForm { Text, Paths, Json };
 int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams);
@@ -53,7 +55,7 @@ struct RunOptions {
 /// Runs a setup and waits for the end: done, findings when the engine failed, could not when it was not started.
 int RunCommand(const RunOptions& options, Streams streams);
 
-/// What a data file holds, by its header alone.
+/// What a data file holds, by its header alone; also of shapes (.shp) and of texts of points (.txt, .xyz), read whole.
 int DataInfoCommand(const std::string& path, bool json, Streams streams);
 /// The range, mean and missing values of each item; reads the whole file.
 int DataStatsCommand(const std::string& path, Streams streams);

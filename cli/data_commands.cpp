@@ -12,7 +12,10 @@
 #include "cli/json.h"
 #include "platform/datafile.h"
 #include "platform/datafile_request.h"
+#include "platform/paths.h"
+#include "platform/shapes.h"
 #include "platform/text.h"
+#include "platform/xyz_text.h"
 
 namespace tervane {
 
@@ -145,9 +148,82 @@ std::string Summarize(const DataFile& file, int number, std::vector<ValueSummary
   return {};
 }
 
+std::string BoxText(const Envelope& box) {
+  return fmt::format("x {} to {}, y {} to {}", ShortestNumber(box.xMin), ShortestNumber(box.xMax),
+                     ShortestNumber(box.yMin), ShortestNumber(box.yMax));
+}
+
+std::string JsonBox(const Envelope& box) {
+  return JsonArray(
+      {ShortestNumber(box.xMin), ShortestNumber(box.yMin), ShortestNumber(box.xMax), ShortestNumber(box.yMax)});
+}
+
+int TellPoints(const std::string& path, bool json, Streams streams) {
+  const auto facts = XyzFactsOf(path);
+  if (!facts->error.empty()) {
+    fmt::print(streams.err, "{}\n", facts->error);
+    return kCouldNot;
+  }
+  if (json)
+    fmt::print(streams.out, "{}\n",
+               JsonObject({{"points", std::to_string(facts->points)},
+                           {"extent", JsonBox(facts->extent)},
+                           {"smallest", ShortestNumber(facts->smallest)},
+                           {"largest", ShortestNumber(facts->largest)}}));
+  else
+    fmt::print(streams.out, "{}: {} point{}, {}\nvalues: smallest {}, largest {}\n", path, facts->points,
+               facts->points == 1 ? "" : "s", BoxText(facts->extent), ShortestNumber(facts->smallest),
+               ShortestNumber(facts->largest));
+  return kDone;
+}
+
+int TellShapes(const std::string& path, bool json, Streams streams) {
+  const auto facts = ShapeFactsOf(path);
+  if (!facts->error.empty()) {
+    fmt::print(streams.err, "{}\n", facts->error);
+    return kCouldNot;
+  }
+  if (!facts->note.empty()) fmt::print(streams.err, "{}: note: {}\n", path, facts->note);
+  // A damaged table is told by the note already.
+  if (facts->note.find(facts->tableProblem) == std::string::npos)
+    fmt::print(streams.err, "{}: note: {}\n", path, facts->tableProblem);
+  constexpr std::string_view kKinds[] = {"points", "lines", "polygons", "points"};
+  constexpr std::string_view kFields[] = {"text", "whole number", "real number"};
+  const std::string_view kind = kKinds[static_cast<std::size_t>(facts->kind)];
+  const auto kindOf = [&](const ShapeField& field) { return kFields[static_cast<std::size_t>(field.kind)]; };
+  if (json) {
+    std::vector<std::string> fields;
+    for (const ShapeField& field : facts->fields)
+      fields.push_back(JsonObject({{"name", JsonQuoted(field.name)}, {"kind", JsonQuoted(kindOf(field))}}));
+    fmt::print(streams.out, "{}\n",
+               JsonObject({{"shapes", std::to_string(facts->shapes)},
+                           {"kind", JsonQuoted(kind)},
+                           {"withoutPoints", std::to_string(facts->withoutPoints)},
+                           {"points", std::to_string(facts->points)},
+                           {"extent", facts->extent ? JsonBox(*facts->extent) : ""},
+                           {"projection", facts->projection.empty() ? "" : JsonQuoted(facts->projection)},
+                           {"attributes", JsonArray(fields)}}));
+    return kDone;
+  }
+  fmt::print(streams.out, "{}: {} {}{}, {}\n", path, facts->shapes, kind,
+             facts->withoutPoints > 0 ? fmt::format(" ({} of them without points)", facts->withoutPoints) : "",
+             facts->extent ? BoxText(*facts->extent) : "no points");
+  fmt::print(streams.out, "{}\n",
+             facts->projection.empty() ? "no projection" : fmt::format("projection {}", facts->projection));
+  for (const ShapeField& field : facts->fields)
+    fmt::print(streams.out, "attribute {}: {}\n", field.name, kindOf(field));
+  return kDone;
+}
+
+bool HasExtension(const std::string& path, std::initializer_list<std::string_view> extensions) {
+  return std::ranges::find(extensions, LowerCase(ExtensionOf(path))) != extensions.end();
+}
+
 }  // namespace
 
 int DataInfoCommand(const std::string& path, bool json, Streams streams) {
+  if (HasExtension(path, {".shp"})) return TellShapes(path, json, streams);
+  if (HasExtension(path, {".txt", ".xyz"})) return TellPoints(path, json, streams);
   DataFile file;
   if (!OpenDataFile(file, path, streams)) return kCouldNot;
   json ? WriteInfoAsJson(file, streams.out) : WriteInfoAsText(file, streams.out);
@@ -157,6 +233,8 @@ int DataInfoCommand(const std::string& path, bool json, Streams streams) {
 int DataStatsCommand(const std::string& path, Streams streams) {
   /// Of a file with more steps, only the whole is told.
   constexpr std::size_t kMostStepsTold = 24;
+  if (HasExtension(path, {".txt", ".xyz"})) return TellPoints(path, false, streams);
+  if (HasExtension(path, {".shp"})) return TellShapes(path, false, streams);
   DataFile file;
   if (!OpenDataFile(file, path, streams)) return kCouldNot;
   for (std::size_t i = 0; i < file.Items().size(); ++i) {

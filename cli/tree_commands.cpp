@@ -48,7 +48,7 @@ void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyRefe
   fmt::print(streams.out, "{}  {} ({}){}\n", place.path, place.node.GetTitle(), ClassNameOf(place.node),
              place.takesPart ? "" : ", takes no part");
   for (const Finding& finding : place.node.Findings())
-    fmt::print(streams.out, "  ! {}: {}\n", finding.severity == Severity::Error ? "error" : "warning", finding.text);
+    fmt::print(streams.out, "  ! {}: {}\n", NameOf(finding.severity), finding.text);
   const KvfSection* section = place.node.GetSectionName().empty() ? nullptr : written.SectionOf(place.node);
   for (const KvfNode* node = section ? section->firstChild : nullptr; node; node = node->next) {
     if (!node->IsKeyword()) continue;

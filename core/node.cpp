@@ -245,6 +245,10 @@ void CYbSEKvfBase::SetRevalidateAll() {
   if (root_) root_->revalidateAll_ = true;
 }
 
+std::string_view NameOf(Severity severity) {
+  return severity == Severity::Error ? "error" : severity == Severity::Warning ? "warning" : "note";
+}
+
 void CYbSEKvfBase::AddError(std::string text, std::string key, std::string detail) {
   findings_.push_back({Severity::Error, std::move(text), std::move(key), std::move(detail)});
 }

@@ -22,7 +22,10 @@ namespace tervane {
 
 class CYbSEKvfGlobalBase;
 
-enum class Severity { Error, Warning };
+/// A note only tells: nothing needs to be done.
+enum class Severity { Error, Warning, Note };
+/// "error", "warning", "note".
+std::string_view NameOf(Severity severity);
 
 /// What a validation found at a node.
 struct Finding {
@@ -30,6 +33,8 @@ struct Finding {
   std::string text;
   std::string key;     ///< The key that it speaks of; may be empty.
   std::string detail;  ///< The reason behind a fixed text; may be empty.
+
+  bool operator==(const Finding&) const = default;
 };
 
 /// A line of the overview page.
@@ -183,6 +188,7 @@ class CYbSEKvfBase {
 
   void AddError(std::string text, std::string key = {}, std::string detail = {});
   void AddWarning(std::string text, std::string key = {}, std::string detail = {});
+  void AddFinding(Finding finding) { findings_.push_back(std::move(finding)); }
 
   /// The page that the tree of the setup data shows.
   void SetPage(const PageClass& page) { setupPage_ = &page; }

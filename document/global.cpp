@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "core/doc_version.h"
+#include "document/coverage_board.h"
 #include "document/overview.h"
 #include "document/saturated_zone_reload.h"
 #include "document/view_settings.h"
@@ -55,6 +56,7 @@ constexpr std::array kChildren{
     ChildRow{Make<CExecuteEngineFlagsKvf>, "EXECUTE_ENGINE_FLAGS"},
     ChildRow{Make<CProcDataKvf>, "PROCESSED_DATA"},
     ChildRow{Make<COverviewKvf>, "OVERVIEW"},
+    ChildRow{Make<CCoverageKvf>, "COVERAGE"},
 };
 
 // The reading order, in important names; a name that no node bears is passed over.

@@ -9,5 +9,6 @@
 namespace tervane {
 
 inline constexpr PageClass kOverviewPage{"COverviewDlg", 16535};
+inline constexpr PageClass kCoveragePage{"CCoverageDlg", 32001};
 
 }  // namespace tervane

@@ -40,15 +40,6 @@ std::string WithUnit(double value, int itemType) {
   return unit.empty() ? number : fmt::format("{} {}", number, unit);
 }
 
-/// The identity of the zone or station of that title, "" without one: setups hold the title of what fills gaps.
-std::string IdOfTitle(const CFMSEKvfBase& owner, const std::string& title) {
-  const std::vector<CFMSEKvfGroupBase*> items = ZoneItems(owner);
-  const std::vector<std::string> titles = ZoneItemTitles(owner);
-  const auto found = std::ranges::find(titles, title);
-  return found == titles.end() ? std::string()
-                               : items[static_cast<std::size_t>(found - titles.begin())]->GetStationId();
-}
-
 /// The mean of the steps of a file of grids that end within a period, or of all steps where the file has no dates.
 FileResult MeanOfSteps(const std::string& path, int number, const CYbDateTime& start, const CYbDateTime& end,
                        CTvn2DOrthoRotatedGridData& grid) {
@@ -228,7 +219,7 @@ void Preprocessor::ShowZones(CodedZonesKvf& zones, ReportPage& page) {
     source.item = zones.GridFile().SelectedItem();
   } else if (zones.UsesPolygons()) {
     source.polygons = {zones.ShapeFile().File.Absolute(), zones.ShapeFile().Attribute(),
-                       IdOfTitle(zones, zones.ShapeGapFillName), zones.ShapeAxisUnit};
+                       IdOfItem(zones, zones.ShapeGapFillName), zones.ShapeAxisUnit};
   } else {
     return page.ShowText("One zone for the whole area.");
   }
@@ -246,7 +237,7 @@ void Preprocessor::ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page
         source.item = stations.GridFile().SelectedItem();
       } else {
         source.polygons = {stations.ShapeFile().File.Absolute(), stations.ShapeFile().Attribute(),
-                           IdOfTitle(forcing, stations.ShapeGapFillName), stations.ShapeAxisUnit};
+                           IdOfItem(forcing, stations.ShapeGapFillName), stations.ShapeAxisUnit};
       }
       return ShowZoneMap(forcing, source, page);
     case C2DStationBasedDataKvf::kFullyDistributed: {

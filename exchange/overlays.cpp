@@ -56,6 +56,7 @@ void COverlayBMPKvf::ExchangeKeys(KeyExchange& keys) {
 COverlayGridKvf::COverlayGridKvf(CYbSEKvfBase* parent)
     : OverlayLayer("OverlayGrid", "OverlayGrid", parent), file_(NewChild<CTvnData2DNdsFile>()) {
   file_->SetFileUsed(0);
+  file_->SetDomainCheck(0);
 }
 
 void COverlayGridKvf::ExchangeKeys(KeyExchange& keys) {

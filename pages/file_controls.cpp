@@ -9,7 +9,6 @@
 #include <fmt/format.h>
 
 #include "pages/page_form.h"
-#include "platform/datafile.h"
 #include "platform/datafile_request.h"
 #include "spatial/file_nodes.h"
 
@@ -37,9 +36,9 @@ bool BrowseDataFile(DataFileNode& node, Host::FileQuestion question, Host& host)
   question.current = node.File.IsEmpty() ? folder : node.File.Absolute();
   const auto path = host.AskFileToOpen(question);
   if (!path) return false;
-  DataFile file;
-  if (const std::string error = file.Open(*path); !error.empty()) {
-    host.Tell(error, Host::Icon::Error);
+  const auto file = DataFileFactsOf(*path);
+  if (!file->error.empty()) {
+    host.Tell(file->error, Host::Icon::Error);
     return false;
   }
   Host::ItemQuestion items;
@@ -47,14 +46,14 @@ bool BrowseDataFile(DataFileNode& node, Host::FileQuestion question, Host& host)
   items.file = *path;
   items.heads = {"Item", "Quantity", "Unit", "Period", "Steps", "Size"};
   const DataFileRequest request = node.SelectionRequest();
-  for (std::size_t i = 0; i < file.Items().size(); ++i) {
-    const DataItem& item = file.Items()[i];
+  for (std::size_t i = 0; i < file->items.size(); ++i) {
+    const DataItem& item = file->items[i];
     const ItemType* type = FindItemType(item.itemType);
     const int number = static_cast<int>(i) + 1;
     items.rows.push_back({{item.name, std::string(type ? type->name : "unknown"), item.unitText,
-                           item.hasTime ? PeriodText(file.Time()) : "at all times",
-                           fmt::format("{}", item.hasTime ? file.Time().steps : 1), SizeText(item)},
-                          WhyNotMet(file, std::array{number}, request)});
+                           item.hasTime ? PeriodText(file->time) : "at all times",
+                           fmt::format("{}", item.hasTime ? file->time.steps : 1), SizeText(item)},
+                          WhyNotMet(*file, std::array{number}, request)});
     if (items.current < 0 && items.rows.back().refusal.empty()) items.current = static_cast<int>(i);
   }
   const auto chosen = host.AskItem(items);

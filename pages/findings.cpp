@@ -23,15 +23,19 @@ std::uint64_t NearestSerial(const SerialsByPath& serials, const std::string& typ
   return nearest;
 }
 
+SetupFinding::Kind KindOf(Severity severity) {
+  return severity == Severity::Error     ? SetupFinding::Kind::Error
+         : severity == Severity::Warning ? SetupFinding::Kind::Warning
+                                         : SetupFinding::Kind::Note;
+}
+
 /// The findings of all nodes below, in the order of the walk. A path is made for a node that has some alone.
 void AddFindings(const CYbSEKvfBase& node, std::vector<SetupFinding>& found) {
-  using Kind = SetupFinding::Kind;
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
     if (!child->HoldsSetup()) continue;
     const std::string path = child->Findings().empty() ? std::string() : PathOf(*child);
     for (const Finding& finding : child->Findings())
-      found.push_back({finding.severity == Severity::Error ? Kind::Error : Kind::Warning, path, finding.text,
-                       finding.key, finding.detail, 0, child->Serial()});
+      found.push_back({KindOf(finding.severity), path, finding.text, finding.key, finding.detail, 0, child->Serial()});
     AddFindings(*child, found);
   }
 }

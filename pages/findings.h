@@ -29,6 +29,11 @@ struct SetupFinding {
 /// "error", "warning", "note", "unread".
 std::string_view KindName(SetupFinding::Kind kind);
 
+/// False for a note of a node, which only tells.
+inline bool NeedsAttention(const SetupFinding& finding) {
+  return finding.kind != SetupFinding::Kind::Note || finding.line > 0;
+}
+
 /// What reading the file met, then the findings of the latest validation of all nodes, then what was not read.
 std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document);
 

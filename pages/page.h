@@ -34,6 +34,8 @@ struct PageContext {
   bool isReplacement = false;
   /// The user's units; null for base units. They outlive the page.
   const DisplayUnits* displayUnits = nullptr;
+  /// Shows the page anew once the present call has returned; empty where nobody looks at it.
+  std::function<void()> syncSoon = {};
 };
 
 /// A page: edits one node and holds no values of its own.

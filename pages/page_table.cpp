@@ -7,6 +7,7 @@
 #include "exchange/overlays.h"
 #include "exchange/pages.h"
 #include "execution/pages.h"
+#include "pages/document/coverage_page.h"
 #include "pages/document/document_pages.h"
 #include "pages/execution/processed_pages.h"
 #include "pages/page.h"
@@ -41,6 +42,7 @@ std::unique_ptr<CYbSEDlgBase> Make(CYbSEKvfBase& node, PageContext context) {
 const std::array kPages{
     PageRow{kHelpPage, Make<CTvnHelpView, CYbSEKvfBase>},
     PageRow{kOverviewPage, Make<COverviewDlg, COverviewKvf>},
+    PageRow{kCoveragePage, Make<CCoverageDlg, CCoverageKvf>},
     PageRow{kDisplayPage, Make<CDisplayDlg, COverlaysKvf>},
     PageRow{kCatchmentPage, Make<CCatchmentDlg, CCatchmentKvf>},
     PageRow{kData2DPage, Make<CData2DDlg, CData2DKvf>},

@@ -61,7 +61,24 @@ CellKind TableForm::Kind(int row, int column) const {
 bool TableForm::IsReadOnly(int row, int column) const {
   CYbSEKvfBase* item = list_.GetItemNode(row);
   const TableColumn* shown = ColumnAt(column);
-  return !item || !shown || (shown->readOnly && shown->readOnly(*item));
+  return !item || !shown || isShownOnly_ || (shown->readOnly && shown->readOnly(*item));
+}
+
+std::string TableForm::Icon(int row, int column) const {
+  CYbSEKvfBase* item = list_.GetItemNode(row);
+  const TableColumn* shown = ColumnAt(column);
+  return item && shown && shown->icon ? shown->icon(*item) : std::string();
+}
+
+bool TableForm::IsLink(int row, int column) const {
+  const TableColumn* shown = ColumnAt(column);
+  return list_.GetItemNode(row) && shown && shown->press;
+}
+
+bool TableForm::Press(int row, int column) const {
+  if (!IsLink(row, column)) return false;
+  ColumnAt(column)->press(*list_.GetItemNode(row));
+  return true;
 }
 
 const std::string& TableForm::ToolTip(int column) const {

@@ -52,6 +52,10 @@ struct TableColumn {
   int itemType = 0;  ///< The numbers are quantities of that item type; 0 for none.
   /// The number of a cell, where the column holds numbers.
   std::function<std::variant<float*, double*>(CYbSEKvfBase&)> number;
+  /// The name of an icon in front of a cell's text; empty for none.
+  std::function<std::string(CYbSEKvfBase& item)> icon;
+  /// What a click on a cell does, which is shown as a link.
+  std::function<void(CYbSEKvfBase& item)> press;
 
   /// The numbers are shown and typed in a unit, which then goes before `text` and `enter`.
   bool HasUnit() const { return number && (itemType != 0 || !unit.empty()); }
@@ -110,6 +114,17 @@ class TableForm {
   /// "Insert Row", "Move 3 Rows Up".
   std::string ActionName(RowAction action, int rows) const;
   void SetDisplayUnits(const DisplayUnits* units) { displayUnits_ = units; }
+  /// Nothing can be changed: the rows are made by the page. `chosen` is told the row of the current cell, from 1.
+  void ShowOnly(std::function<void(int row)> chosen = {}) {
+    isShownOnly_ = true;
+    chosen_ = std::move(chosen);
+  }
+  bool IsShownOnly() const { return isShownOnly_; }
+  void Choose(int row) const {
+    if (chosen_ && row >= 1 && row <= RowCount()) chosen_(row);
+  }
+  /// Takes all columns away, for a table whose columns follow what it shows.
+  void ClearColumns() { columns_.clear(); }
 
   CYbSEKvfListBaseInterface& List() const { return list_; }
   const std::vector<TableColumn>& Columns() const { return columns_; }
@@ -126,6 +141,10 @@ class TableForm {
   CellKind Kind(int row, int column) const;
   bool IsReadOnly(int row, int column) const;
   const std::string& ToolTip(int column) const;
+  std::string Icon(int row, int column) const;
+  bool IsLink(int row, int column) const;
+  /// What a click on a cell does; false where that is nothing.
+  bool Press(int row, int column) const;
   const std::vector<std::string>& Choices(int column) const;
   /// The cell as a person sees it: of a choice the chosen text.
   std::string ShownCell(int row, int column) const;
@@ -173,6 +192,8 @@ class TableForm {
   std::vector<TableColumn> columns_;
   const DisplayUnits* displayUnits_ = nullptr;
   std::string itemName_ = "Row", itemNames_ = "Rows";
+  bool isShownOnly_ = false;
+  std::function<void(int)> chosen_;
 };
 
 /// A table as text: heads and rows, cells separated by " | ".

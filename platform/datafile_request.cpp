@@ -6,6 +6,8 @@
 
 #include <fmt/format.h>
 
+#include "platform/text.h"
+
 namespace tervane {
 
 namespace {
@@ -32,13 +34,35 @@ std::string WhyTypeIsWrong(int number, const DataItem& item, const std::vector<i
                      names);
 }
 
-std::string WhyPeriodIsNotCovered(const DataItem& item, const TimeAxis& time, const DataFileRequest::Period& period) {
+/// Why an item cannot be converted to its quantity, or stands on cells that no grid here has.
+std::string WhyValuesAreUnfit(int number, const DataItem& item, const DataFileRequest& request) {
+  const ItemType* type = request.itemTypes.empty() ? nullptr : FindItemType(item.itemType);
+  if (type && type->code != kUndefinedItemType &&
+      (!item.scale || item.scale->dimension != BaseUnit(*type).scale.dimension))
+    return fmt::format("item {} is in \"{}\", which is no unit of {}", number, item.unitText, type->name);
+  const FileGeometry& g = item.geometry;
+  if (item.dimensions >= 2 && !g.HasSquareCells())
+    return fmt::format("item {} has cells of {} x {}, square ones were expected; resample the grid", number,
+                       ShortestNumber(g.cellSize), ShortestNumber(g.cellHeight));
+  return {};
+}
+
+std::string Plural(std::size_t count, std::string_view one, std::string_view many) {
+  return fmt::format("{} {}", count == 1 ? "one" : std::to_string(count), count == 1 ? one : many);
+}
+
+}  // namespace
+
+CYbDateTime StartOfValues(const DataItem& item, const TimeAxis& time) {
+  const bool isOfSteps = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
+  return isOfSteps && time.begin ? *time.begin : time.Start();
+}
+
+std::string WhyNotCovered(const DataItem& item, const TimeAxis& time, const DataFileRequest::Period& period) {
   // What holds always covers everything.
   if (!item.hasTime) return {};
   if (time.stamps.empty()) return "the file has no dates";
-  // Over steps, the first value holds from the begin of its interval.
-  const bool isOfSteps = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
-  const CYbDateTime start = isOfSteps && time.begin ? *time.begin : time.Start();
+  const CYbDateTime start = StartOfValues(item, time);
   const bool isLate = period.start < start, isShort = time.End() < period.end;
   if (!isLate && !isShort) return {};
   const std::string simulation =
@@ -49,41 +73,33 @@ std::string WhyPeriodIsNotCovered(const DataItem& item, const TimeAxis& time, co
                      simulation);
 }
 
-std::string Plural(std::size_t count, std::string_view one, std::string_view many) {
-  return fmt::format("{} {}", count == 1 ? "one" : std::to_string(count), count == 1 ? one : many);
-}
-
-}  // namespace
-
-std::string WhyNotMet(const DataFile& file, std::span<const int> items, const DataFileRequest& request) {
+std::string WhyNotMet(const DataFileFacts& file, std::span<const int> items, const DataFileRequest& request) {
   constexpr int kFirst[] = {1};
   if (items.empty()) items = kFirst;
   for (const int number : items) {
-    if (number < 1 || static_cast<std::size_t>(number) > file.Items().size()) {
-      return fmt::format("there is no item {}: the file has {}", number, file.Items().size());
-    }
-    const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)];
+    if (std::string reason = file.WhyNoItem(number); !reason.empty()) return reason;
+    const DataItem& item = *file.Item(number);
     if (request.dimensions && item.dimensions != *request.dimensions) {
       return fmt::format("item {} is {}, {} was expected", number, KindOf(item.dimensions),
                          KindOf(*request.dimensions));
     }
     if (std::string reason = WhyTypeIsWrong(number, item, request.itemTypes); !reason.empty()) return reason;
-    const std::size_t steps = item.hasTime ? file.Time().steps : 1;
+    if (std::string reason = WhyValuesAreUnfit(number, item, request); !reason.empty()) return reason;
+    const std::size_t steps = item.hasTime ? file.time.steps : 1;
     if (request.steps && steps != *request.steps) {
       return fmt::format("the file has {}, {} expected", Plural(steps, "time step", "time steps"),
                          *request.steps == 1 ? "one was" : fmt::format("{} were", *request.steps));
     }
     if (steps == 0) return "the file has no time steps";
     if (!request.period) continue;
-    if (std::string reason = WhyPeriodIsNotCovered(item, file.Time(), *request.period); !reason.empty()) return reason;
+    if (std::string reason = WhyNotCovered(item, file.time, *request.period); !reason.empty()) return reason;
   }
   return {};
 }
 
 std::string WhyNotMet(const std::string& path, std::span<const int> items, const DataFileRequest& request) {
-  DataFile file;
-  std::string error = file.Open(path);
-  return error.empty() ? WhyNotMet(file, items, request) : error;
+  const auto file = DataFileFactsOf(path);
+  return file->error.empty() ? WhyNotMet(*file, items, request) : file->error;
 }
 
 std::string DateInWords(const CYbDateTime& date) {

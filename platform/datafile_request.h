@@ -10,7 +10,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/datafile.h"
+#include "platform/datafile_facts.h"
 #include "platform/dates.h"
 
 namespace tervane {
@@ -29,9 +29,15 @@ struct DataFileRequest {
 
 /// "" when the selected items (counted from 1; none stands for item 1) meet the request, else why not in words: "item 2
 /// is Elevation, Precipitation Rate was expected". Nothing is read.
-std::string WhyNotMet(const DataFile& file, std::span<const int> items, const DataFileRequest& request);
-/// The same of a file that is opened for this alone.
+std::string WhyNotMet(const DataFileFacts& file, std::span<const int> items, const DataFileRequest& request);
+/// The same of a file by its path.
 std::string WhyNotMet(const std::string& path, std::span<const int> items, const DataFileRequest& request);
+
+/// Why the values do not cover a period: "the file covers 2000-01-01 to 2000-12-31, the simulation starts at
+/// 1999-01-01"; empty when they do.
+std::string WhyNotCovered(const DataItem& item, const TimeAxis& time, const DataFileRequest::Period& period);
+/// From when on the values hold: over steps, from the begin of the first one's interval.
+CYbDateTime StartOfValues(const DataItem& item, const TimeAxis& time);
 
 /// A date for people: without the time at midnight, and without seconds where there are none.
 std::string DateInWords(const CYbDateTime& date);

@@ -2,11 +2,14 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/grid_files.h"
 
+#include <cmath>
+
 #include <fmt/format.h>
 
-#include "platform/datafile.h"
+#include "platform/datafile_facts.h"
 #include "platform/datafile_writer.h"
 #include "platform/grid_interpolation.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -14,14 +17,16 @@ namespace {
 
 FileResult Failed(std::string error) { return {std::move(error), {}}; }
 
-/// Opens a file and finds an item with a grid of square cells.
-FileResult OpenGrid(const std::string& path, int number, DataFile& file, const DataItem*& item) {
-  if (path.empty()) return Failed("no file is chosen");
-  if (std::string error = file.Open(path); !error.empty()) return Failed(std::move(error));
-  if (number < 1 || number > static_cast<int>(file.Items().size()))
-    return Failed(fmt::format("{}: there is no item {}: the file has {}", path, number, file.Items().size()));
-  item = &file.Items()[static_cast<std::size_t>(number - 1)];
-  if (item->dimensions < 2) return Failed(fmt::format("{}: item {} is no grid", path, number));
+/// Why an item cannot be read as a grid of square cells; empty when it can.
+std::string WhyNoGrid(const std::string& path, const std::vector<DataItem>& items, int number) {
+  if (number < 1 || static_cast<std::size_t>(number) > items.size())
+    return fmt::format("{}: there is no item {}: the file has {}", path, number, items.size());
+  const DataItem& item = items[static_cast<std::size_t>(number - 1)];
+  if (item.dimensions < 2) return fmt::format("{}: item {} is no grid", path, number);
+  const FileGeometry& g = item.geometry;
+  if (!g.HasSquareCells())
+    return fmt::format("{}: item {} has cells of {} x {}, square ones are expected; resample the grid", path, number,
+                       ShortestNumber(g.cellSize), ShortestNumber(g.cellHeight));
   return {};
 }
 
@@ -34,9 +39,11 @@ GridGeometry GeometryOf(const DataItem& item) {
 
 FileResult ReadGridData(const std::string& path, int number, CTvn2DOrthoRotatedGridData& grid, ProgressPart progress,
                         const GridSlice& slice) {
+  if (path.empty()) return Failed("no file is chosen");
   DataFile file;
-  const DataItem* item = nullptr;
-  if (FileResult result = OpenGrid(path, number, file, item); !result.Ok()) return result;
+  if (std::string error = file.Open(path); !error.empty()) return Failed(std::move(error));
+  if (std::string reason = WhyNoGrid(path, file.Items(), number); !reason.empty()) return Failed(std::move(reason));
+  const DataItem* item = &file.Items()[static_cast<std::size_t>(number - 1)];
   GridGeometry geometry = GeometryOf(*item);
   if (std::string problem = geometry.Problem(); !problem.empty()) return Failed(fmt::format("{}: {}", path, problem));
   std::vector<float> values(item->CellsOfLayer());
@@ -86,27 +93,24 @@ FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridDa
 }
 
 FileResult ReadGeoInfoFromNdsFile(const std::string& path, int number, GridGeometry& geometry) {
-  DataFile file;
-  const DataItem* item = nullptr;
-  FileResult result = OpenGrid(path, number, file, item);
-  if (result.Ok()) geometry = GeometryOf(*item);
+  const auto file = DataFileFactsOf(path);
+  FileResult result = Failed(file->error.empty() ? WhyNoGrid(path, file->items, number) : file->error);
+  if (result.Ok()) geometry = GeometryOf(*file->Item(number));
   return result;
 }
 
 std::string ItemNameOf(const std::string& path, int number) {
-  DataFile file;
-  const bool isOpen = !path.empty() && file.Open(path).empty();
-  const bool isThere = isOpen && number >= 1 && number <= static_cast<int>(file.Items().size());
-  return isThere ? file.Items()[static_cast<std::size_t>(number - 1)].name : std::string();
+  const DataItem* item = DataFileFactsOf(path)->Item(number);
+  return item ? item->name : std::string();
 }
 
 DomainFileState ReadDomainFacts(const std::string& path, DomainFileFacts& facts) {
-  DataFile file;
-  if (path.empty() || !file.Open(path).empty()) return DomainFileState::Unreadable;
-  if (file.Items().empty()) return DomainFileState::NoItem;
-  ItemStatistics statistics;
-  if (!file.Statistics(1, statistics).empty()) return DomainFileState::NoStatistics;
-  facts = {statistics.smallest, statistics.largest};
+  const auto file = DataFileFactsOf(path);
+  if (!file->error.empty()) return DomainFileState::Unreadable;
+  if (file->items.empty()) return DomainFileState::NoItem;
+  const auto range = ItemRangeOf(path, 1);
+  if (!range->error.empty()) return DomainFileState::NoStatistics;
+  facts = {range->statistics.smallest, range->statistics.largest};
   return DomainFileState::Read;
 }
 

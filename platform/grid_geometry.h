@@ -4,6 +4,7 @@
 // Where the cells of a grid lie, and how data files say it.
 #pragma once
 
+#include <cmath>
 #include <optional>
 #include <span>
 #include <string>
@@ -24,6 +25,8 @@ struct FileGeometry {
   bool isGeographical = false;
 
   bool IsPlaced() const { return cellSize > 0; }
+  /// But for what rounding loses.
+  bool HasSquareCells() const { return !IsPlaced() || std::abs(cellHeight - cellSize) <= 1e-3 * cellSize; }
   bool operator==(const FileGeometry&) const = default;
 };
 

@@ -23,18 +23,21 @@ namespace {
 /// Reads a table row by row and counts its lines.
 class CsvReader {
  public:
-  explicit CsvReader(std::string_view text) : rest_(text) {
+  /// With `mayBeBlank` the last blank of a line separates where no sign does.
+  CsvReader(std::string_view text, bool mayBeBlank) : rest_(text) {
     constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
     if (rest_.starts_with(kByteOrderMark)) rest_.remove_prefix(kByteOrderMark.size());
     const std::string_view first = rest_.substr(0, rest_.find('\n'));
     // A comma may stand in the names of a table that other signs separate.
     for (const char sign : {'\t', ';', ','}) {
       separator_ = sign;
-      if (first.find(sign) != std::string_view::npos) break;
+      if (first.find(sign) != std::string_view::npos) return;
     }
+    isBlankSeparated_ = mayBeBlank;
   }
 
-  char Separator() const { return separator_; }
+  /// Whether commas separate cells, so that none is a decimal mark.
+  bool SeparatesByComma() const { return separator_ == ',' && !isBlankSeparated_; }
   /// Where the present row begins, counted from 1.
   std::size_t Line() const { return line_; }
 
@@ -43,7 +46,7 @@ class CsvReader {
     do {
       if (rest_.empty()) return false;
       line_ = nextLine_;
-      ReadRow(cells);
+      isBlankSeparated_ ? ReadWords(cells) : ReadRow(cells);
       if (isQuoteOpen_) return false;
     } while (cells.size() == 1 && Trimmed(cells[0]).empty());
     return true;
@@ -51,6 +54,16 @@ class CsvReader {
   bool IsQuoteOpen() const { return isQuoteOpen_; }
 
  private:
+  void ReadWords(std::vector<std::string>& cells) {
+    const std::size_t end = std::min(rest_.find('\n'), rest_.size());
+    const std::string_view line = Trimmed(rest_.substr(0, end));
+    rest_.remove_prefix(std::min(end + 1, rest_.size()));
+    ++nextLine_;
+    const std::size_t blank = line.find_last_of(' ');
+    cells = {std::string(line.substr(0, blank))};
+    if (blank != std::string_view::npos) cells.emplace_back(line.substr(blank + 1));
+  }
+
   void ReadRow(std::vector<std::string>& cells) {
     cells.assign(1, {});
     bool isQuoted = false;
@@ -83,6 +96,7 @@ class CsvReader {
 
   std::string_view rest_;
   char separator_ = ',';
+  bool isBlankSeparated_ = false;
   std::size_t line_ = 0, nextLine_ = 1;
   bool isQuoteOpen_ = false;
 };
@@ -94,7 +108,7 @@ std::optional<CYbDateTime> ParseIsoDate(std::string_view text) {
   std::size_t count = 0;
   for (; count < fields.size() && !text.empty(); ++count) {
     if (count > 0) {
-      const std::string_view separators = count < 3 ? "-" : count == 3 ? " T" : ":";
+      const std::string_view separators = count < 3 ? "-/" : count == 3 ? " T" : ":";
       if (separators.find(text.front()) == std::string_view::npos) break;
       text.remove_prefix(1);
     }
@@ -184,31 +198,23 @@ std::size_t FindColumn(const std::vector<std::string>& names, std::string_view w
   return 0;
 }
 
-}  // namespace
-
-std::vector<std::string> CsvColumns(std::string_view text) {
-  CsvReader reader(text);
-  std::vector<std::string> names;
-  if (!reader.Next(names)) return {};
-  names.erase(names.begin());
-  for (std::string& name : names) name = Trimmed(name);
-  return names;
-}
-
-CsvSeries ReadCsvSeries(std::string_view text, std::string_view column) {
+/// `mayLackNames`: the first line may hold values already.
+CsvSeries ReadSeries(std::string_view text, std::string_view column, bool mayLackNames) {
   CsvSeries series;
   if (text.find('\0') != std::string_view::npos) {
     series.error = "it contains zero characters; save it as plain text in UTF-8";
     return series;
   }
-  CsvReader reader(text);
+  CsvReader reader(text, mayLackNames);
   std::vector<std::string> cells;
   if (!reader.Next(cells)) {
     series.error = reader.IsQuoteOpen() ? "line 1: a quote is not closed" : "it is empty";
     return series;
   }
   const std::size_t columns = cells.size();
-  const std::size_t place = FindColumn(cells, column, series);
+  // The row of names is read, or it is the first of the values.
+  bool isRowRead = mayLackNames && columns == 2 && ParseIsoDate(Trimmed(cells[0]));
+  const std::size_t place = isRowRead ? 1 : FindColumn(cells, column, series);
   if (!series.error.empty()) return series;
 
   std::vector<std::size_t> lines, missing;
@@ -216,11 +222,11 @@ CsvSeries ReadCsvSeries(std::string_view text, std::string_view column) {
     series.error = fmt::format("line {}: {}", reader.Line(), reason);
     return series;
   };
-  while (reader.Next(cells)) {
+  for (; isRowRead || reader.Next(cells); isRowRead = false) {
     // A separator behind the last cell does no harm.
     if (cells.size() == columns + 1 && Trimmed(cells.back()).empty()) cells.pop_back();
     if (cells.size() != columns) {
-      const bool isDecimal = reader.Separator() == ',' && cells.size() > columns;
+      const bool isDecimal = reader.SeparatesByComma() && cells.size() > columns;
       return refuse(fmt::format("it has {} cells, {} were expected{}", cells.size(), columns,
                                 isDecimal ? "; decimals stand behind a point" : ""));
     }
@@ -237,7 +243,7 @@ CsvSeries ReadCsvSeries(std::string_view text, std::string_view column) {
     }
     const std::string_view cell = Trimmed(cells[place]);
     const bool isMissing = SaysMissing(cell);
-    const std::optional<float> value = isMissing ? kDeleteValue : ParseValue(cell, reader.Separator() != ',');
+    const std::optional<float> value = isMissing ? kDeleteValue : ParseValue(cell, !reader.SeparatesByComma());
     if (!value) {
       return refuse(
           fmt::format("\"{}\" is no number that can be stored; leave the cell empty where there is no value", cell));
@@ -259,6 +265,20 @@ CsvSeries ReadCsvSeries(std::string_view text, std::string_view column) {
   NoteGaps(series, lines);
   return series;
 }
+
+}  // namespace
+
+std::vector<std::string> CsvColumns(std::string_view text) {
+  CsvReader reader(text, false);
+  std::vector<std::string> names;
+  if (!reader.Next(names)) return {};
+  names.erase(names.begin());
+  for (std::string& name : names) name = Trimmed(name);
+  return names;
+}
+
+CsvSeries ReadCsvSeries(std::string_view text, std::string_view column) { return ReadSeries(text, column, false); }
+CsvSeries ReadPastedSeries(std::string_view text) { return ReadSeries(text, {}, true); }
 
 std::string WriteCsvSeries(const DataFile& file, std::string& text) {
   const std::vector<DataItem>& items = file.Items();

@@ -26,10 +26,13 @@ struct CsvSeries {
 std::vector<std::string> CsvColumns(std::string_view text);
 
 /// Reads one column by its name (in any case), or the only one when the name is empty. Cells stand between semicolons,
-/// tabs or commas, whichever the first line shows, and may be quoted as RFC 4180 says. Dates are ISO 8601: 2000-01-31,
-/// with a time as 12:00 or 12:00:30 behind a blank or T. They must ascend. Decimals stand behind a point, or a comma
-/// where no comma separates cells.
+/// tabs or commas, whichever the first line shows, and may be quoted as RFC 4180 says. Dates are ISO 8601: 2000-01-31
+/// or 2000/01/31, with a time as 12:00 or 12:00:30 behind a blank or T. They must ascend. Decimals stand behind a
+/// point, or a comma where no comma separates cells.
 CsvSeries ReadCsvSeries(std::string_view text, std::string_view column);
+/// Dates and values as people paste them: the same with a single column, whose line of names may be missing. Where the
+/// first line has none of the signs, the last blank of each line separates.
+CsvSeries ReadPastedSeries(std::string_view text);
 
 /// The items of a file of time series as such a table, in the file's units; missing values are empty cells. "" or why
 /// not.

@@ -25,8 +25,4 @@ struct NewSeries {
 /// Writes a series as a data file with one item, in place of a file of that name.
 FileResult WriteSeriesFile(const std::string& path, const NewSeries& series, ProgressPart progress = {});
 
-/// Dates and values as people paste them: a line each, separated by a tab, semicolon or comma behind the date. Errors
-/// tell the line; lines without a number at their end are heads where they stand first.
-std::string ParseSeriesText(const std::string& text, NewSeries& series);
-
 }  // namespace tervane

@@ -13,7 +13,9 @@
 #include <fmt/format.h>
 #include <shapefil.h>
 
+#include "platform/file_cache.h"
 #include "platform/paths.h"
+#include "platform/ring_faults.h"
 #include "platform/shapelib_memory.h"
 #include "platform/text.h"
 #include "platform/text_fields.h"
@@ -72,6 +74,12 @@ std::string AsUtf8(std::string_view text, bool& isOther) {
   return utf8;
 }
 
+Reason WhyNoAttribute(const std::string& path, const std::vector<ShapeField>& fields, const std::string& attribute) {
+  std::string names;
+  for (const ShapeField& field : fields) names += (names.empty() ? "" : ", ") + field.name;
+  return fmt::format("{} has no attribute {}; it has: {}", path, attribute, names);
+}
+
 class ShapeFileReader {
  public:
   ShapeKind kind = ShapeKind::Polygon;
@@ -79,6 +87,7 @@ class ShapeFileReader {
   std::vector<Shape> shapes;
   std::string projection;
   std::string note;
+  Reason tableProblem;  ///< Why there are no fields.
 
   explicit ShapeFileReader(ProgressPart progress = {}) : progress_(progress) {}
 
@@ -99,12 +108,21 @@ class ShapeFileReader {
       if (file && isThere) *file = {content->Text(), {}, false, true};
     }
     projection = Trimmed(prj.Text());
-    if (isTableNeeded && !files_.dbf.exists) {
-      return fmt::format("{} has no attributes: {} does not exist beside it", path, WithExtension(".dbf"));
-    }
+    if (!files_.dbf.exists)
+      tableProblem = fmt::format("{} has no attributes: {} does not exist beside it", path, WithExtension(".dbf"));
+    if (isTableNeeded && !tableProblem.empty()) return tableProblem;
     const MemoryFilesScope scope(files_);
     if (Reason reason = OpenShapes(); !reason.empty()) return reason;
     return files_.dbf.exists ? OpenTable(isTableNeeded) : Reason();
+  }
+
+  /// Empty when the table has a record for each shape.
+  Reason WhyTableDiffers() const {
+    const int shapeCount = handle_->nRecords;
+    const int recordCount = table_ ? DBFGetRecordCount(table_.get()) : shapeCount;
+    if (recordCount == shapeCount) return {};
+    return fmt::format("{} has {} shapes, but {} has {} records", path_, shapeCount, WithExtension(".dbf"),
+                       recordCount);
   }
 
   Reason SelectColumns(const std::string& attribute) {
@@ -114,19 +132,13 @@ class ShapeFileReader {
       columnNumbers_.push_back(static_cast<int>(i));
       if (!attribute.empty()) return {};
     }
-    if (attribute.empty()) return {};
-    std::string names;
-    for (const ShapeField& field : fields) names += (names.empty() ? "" : ", ") + field.name;
-    return fmt::format("{} has no attribute {}; it has: {}", path_, attribute, names);
+    return attribute.empty() ? Reason() : WhyNoAttribute(path_, fields, attribute);
   }
 
   Reason ReadShapes(const UnitConversion& toMetres) {
     const MemoryFilesScope scope(files_);
     const int count = handle_->nRecords;
-    if (!columns.empty() && DBFGetRecordCount(table_.get()) != count) {
-      return fmt::format("{} has {} shapes, but {} has {} records", path_, count, WithExtension(".dbf"),
-                         DBFGetRecordCount(table_.get()));
-    }
+    if (Reason reason = WhyTableDiffers(); !columns.empty() && !reason.empty()) return reason;
     int deleted = 0;
     const ProgressPart taking = progress_.Part(kReading, 1);
     for (int i = 0; i < count; ++i) {
@@ -200,9 +212,9 @@ class ShapeFileReader {
     }
     if (!reason.empty()) {
       table_.reset();
-      reason = fmt::format("cannot read {}: {}", name, reason);
-      if (isTableNeeded) return reason;
-      AddNote(note, reason);
+      tableProblem = fmt::format("cannot read {}: {}", name, reason);
+      if (isTableNeeded) return tableProblem;
+      AddNote(note, tableProblem);
       return {};
     }
     for (int i = 0; i < DBFGetFieldCount(table_.get()); ++i) {
@@ -228,7 +240,12 @@ class ShapeFileReader {
 
   Reason ReadShape(int number, const UnitConversion& toMetres, Shape& shape) {
     const ObjectHandle object(SHPReadObject(handle_.get(), number));
-    if (!object || !files_.firstMessage.empty()) return Message("it is damaged");
+    if (!object || !files_.firstMessage.empty()) {
+      Reason reason = Message("it is damaged");
+      // The library counts shapes from 0 and cuts its sentence.
+      const bool isCount = reason.starts_with("Corrupted .shp file");
+      return isCount ? "it is damaged: its numbers of parts and points do not fit its length" : reason;
+    }
     if (object->nSHPType == SHPT_NULL) return {};
     if (object->nSHPType != handle_->nShapeType) {
       return fmt::format("it is of the type {}, the file of the type {}", SHPTypeName(object->nSHPType),
@@ -341,18 +358,67 @@ FileResult CYbShapeData::Read(const std::string& path, const std::string* attrib
   return {{}, reader.note};
 }
 
-FileResult CheckShapeFile(const std::string& path, const ShapeRequest& request, const std::string& attribute) {
+std::vector<FileStamp> StampsOfShape(const std::string& path) {
+  const std::string base = path.substr(0, path.size() - ExtensionOf(path).size());
+  std::vector<FileStamp> stamps = StampsOf(path);
+  for (const char* extension : {".shx", ".dbf", ".prj", ".SHX", ".DBF", ".PRJ"})
+    stamps.push_back(StampOf(base + extension));
+  return stamps;
+}
+
+namespace {
+
+ShapeFacts ReadFacts(const std::string& path) {
+  ShapeFacts facts;
   ShapeFileReader reader;
+  try {
+    facts.error = reader.Open(path, false);
+    if (facts.error.empty()) facts.error = reader.ReadShapes({});
+  } catch (const std::bad_alloc&) {
+    facts.error = fmt::format("cannot read {}: there is no memory for its shapes", path);
+  }
+  if (!facts.error.empty()) return facts;
+  facts.tableProblem = reader.tableProblem.empty() ? reader.WhyTableDiffers() : reader.tableProblem;
+  facts.note = std::move(reader.note);
+  facts.kind = reader.kind;
+  if (facts.kind == ShapeKind::Polygon)
+    if (const std::string fault = FirstRingFault(reader.shapes); !fault.empty()) AddNote(facts.note, fault);
+  facts.fields = std::move(reader.fields);
+  facts.projection = std::move(reader.projection);
+  facts.shapes = reader.shapes.size();
+  for (const Shape& shape : reader.shapes) {
+    facts.withoutPoints += shape.points.empty();
+    facts.points += shape.points.size();
+    for (const MapPoint& point : shape.points) {
+      if (!facts.extent) facts.extent = Envelope{point.x, point.y, point.x, point.y};
+      Envelope& box = *facts.extent;
+      box = {std::min(box.xMin, point.x), std::min(box.yMin, point.y), std::max(box.xMax, point.x),
+             std::max(box.yMax, point.y)};
+    }
+  }
+  return facts;
+}
+
+}  // namespace
+
+std::shared_ptr<const ShapeFacts> ShapeFactsOf(const std::string& path) {
+  static FileCache<ShapeFacts> cache(kMostFacts);
+  return cache.Get(path, "shapes", StampsOfShape(path), [&] { return ReadFacts(path); });
+}
+
+FileResult CheckShapeFile(const std::string& path, const ShapeRequest& request, const std::string& attribute) {
+  const auto facts = ShapeFactsOf(path);
+  if (!facts->error.empty()) return {facts->error, {}};
   const bool isAttributeAsked = request.attribute.has_value();
-  if (Reason reason = reader.Open(path, isAttributeAsked); !reason.empty()) return {reason, {}};
+  if (isAttributeAsked && !facts->tableProblem.empty()) return {facts->tableProblem, {}};
   const struct {
     bool isWanted;
     const char* name;
     bool isHeld;
   } kinds[] = {
-      {request.polygons, "polygons", reader.kind == ShapeKind::Polygon},
-      {request.lines, "lines", reader.kind == ShapeKind::Line},
-      {request.points, "points", reader.kind == ShapeKind::Point || reader.kind == ShapeKind::MultiPoint},
+      {request.polygons, "polygons", facts->kind == ShapeKind::Polygon},
+      {request.lines, "lines", facts->kind == ShapeKind::Line},
+      {request.points, "points", facts->kind == ShapeKind::Point || facts->kind == ShapeKind::MultiPoint},
   };
   std::string wanted;
   bool isHeld = false;
@@ -362,19 +428,23 @@ FileResult CheckShapeFile(const std::string& path, const ShapeRequest& request, 
     isHeld = isHeld || kind.isHeld;
   }
   if (!wanted.empty() && !isHeld) {
-    return {fmt::format("{}: {} were expected, the file holds {}", path, wanted, NameOf(reader.kind)), {}};
+    return {fmt::format("{}: {} were expected, the file holds {}", path, wanted, NameOf(facts->kind)), {}};
   }
-  if (!isAttributeAsked) return {{}, reader.note};
+  if (!facts->extent) {
+    return {fmt::format("{} holds no shape with points", path), {}};
+  }
+  if (!isAttributeAsked) return {{}, facts->note};
   if (attribute.empty()) return {fmt::format("{}: no attribute is selected", path), {}};
-  if (Reason reason = reader.SelectColumns(attribute); !reason.empty()) return {reason, {}};
-  const AttributeKind kind = reader.columns.front().kind;
-  const bool isReal = *request.attribute == AttributeKind::Real && kind == AttributeKind::Whole;
-  if (kind != *request.attribute && !isReal) {
-    return {fmt::format("{}: attribute {} is {}, {} was expected", path, reader.columns.front().name, NameOf(kind),
+  const auto field = std::ranges::find_if(
+      facts->fields, [&](const ShapeField& each) { return EqualIgnoringCase(each.name, attribute); });
+  if (field == facts->fields.end()) return {WhyNoAttribute(path, facts->fields, attribute), {}};
+  const bool isReal = *request.attribute == AttributeKind::Real && field->kind == AttributeKind::Whole;
+  if (field->kind != *request.attribute && !isReal) {
+    return {fmt::format("{}: attribute {} is {}, {} was expected", path, field->name, NameOf(field->kind),
                         NameOf(*request.attribute)),
             {}};
   }
-  return {{}, reader.note};
+  return {{}, facts->note};
 }
 
 }  // namespace tervane

@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <string>
 #include <variant>
@@ -107,6 +108,22 @@ class CTvnShapeData : public CYbShapeData {
   /// none) is an error that names the shape, and nothing is written.
   FileResult SaveShapeFile(const std::string& path) const;
 };
+
+/// What a shape file is, apart from the shapes themselves.
+struct ShapeFacts {
+  std::string error;         ///< Why its shapes cannot be read, with the shape's number; then the rest is empty.
+  std::string tableProblem;  ///< Why there are no attributes: no table, a damaged one, or one of other shapes.
+  std::string note;
+  ShapeKind kind = ShapeKind::Polygon;
+  std::vector<ShapeField> fields;
+  std::string projection;  ///< The text of the .prj, empty when there is none.
+  std::size_t shapes = 0, withoutPoints = 0, points = 0;
+  std::optional<Envelope> extent;  ///< In the unit of the file; nothing where no shape has points.
+};
+/// Reads all shapes once, and keeps the facts while the files stay as they are. Never null.
+std::shared_ptr<const ShapeFacts> ShapeFactsOf(const std::string& path);
+/// The stamps of a shape's files: .shp, .shx, .dbf and .prj.
+std::vector<FileStamp> StampsOfShape(const std::string& path);
 
 /// Tells in words why a file is not as requested ("polygons were expected, the file holds points", "attribute CODE is
 /// text, a whole number was expected"), or that it cannot be read. `attribute` is the selected one; empty when none is.

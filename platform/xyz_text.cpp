@@ -2,10 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/xyz_text.h"
 
+#include <algorithm>
 #include <new>
 
 #include <fmt/format.h>
 
+#include "platform/file_cache.h"
 #include "platform/text.h"
 #include "platform/text_fields.h"
 
@@ -36,6 +38,19 @@ bool BeginsWithNumber(std::string_view line, FieldRules rules) {
   return ReadNumber(NextField(line, rules), rules, number);
 }
 
+/// True for "330000,5 5090000,5 12,5": blanks separate at least three fields, and no comma stands at a blank.
+bool HasCommasInsideNumbers(std::string_view line) {
+  if (line.find(',') == std::string_view::npos) return false;
+  int fields = 0;
+  for (std::string_view rest = Trimmed(line); !rest.empty(); rest = Trimmed(rest)) {
+    const std::string_view field = rest.substr(0, rest.find_first_of(" \t"));
+    if (field.front() == ',' || field.back() == ',') return false;
+    rest.remove_prefix(field.size());
+    ++fields;
+  }
+  return fields >= 3;
+}
+
 FileResult ParseLines(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points,
                       ProgressPart progress) {
   if (const std::string reason = WhyNoText(text); !reason.empty()) {
@@ -49,7 +64,7 @@ FileResult ParseLines(std::string_view text, const std::string& path, std::vecto
     told.After(lines);
     if (IsComment(Trimmed(line))) continue;
     if (points.empty()) {
-      rules.isCommaDecimal = line.find(';') != std::string_view::npos;
+      rules.isCommaDecimal = line.find(';') != std::string_view::npos || HasCommasInsideNumbers(line);
       if (!BeginsWithNumber(line, rules)) continue;
       // The length of the first point tells about how many there are, so that the list seldom grows.
       points.reserve(text.size() / (line.size() + 1) + 1);
@@ -87,6 +102,28 @@ FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& poi
   FileContent content;
   if (FileResult result = ReadWholeFile(path, content, progress.Part(0, kReading)); !result.Ok()) return result;
   return ParseXyz(content.Text(), path, points, progress.Part(kReading, 1));
+}
+
+std::shared_ptr<const XyzFacts> XyzFactsOf(const std::string& path) {
+  static FileCache<XyzFacts> cache(kMostFacts);
+  return cache.Get(path, "points", [&] {
+    XyzFacts facts;
+    std::vector<ScatteredPoint> points;
+    facts.error = ReadXyzFile(path, points).error;
+    facts.points = points.size();
+    if (points.empty()) return facts;
+    const ScatteredPoint& first = points.front();
+    Envelope& box = facts.extent;
+    box = {first.x, first.y, first.x, first.y};
+    facts.smallest = facts.largest = first.z;
+    for (const ScatteredPoint& point : points) {
+      box = {std::min(box.xMin, point.x), std::min(box.yMin, point.y), std::max(box.xMax, point.x),
+             std::max(box.yMax, point.y)};
+      facts.smallest = std::min(facts.smallest, point.z);
+      facts.largest = std::max(facts.largest, point.z);
+    }
+    return facts;
+  });
 }
 
 }  // namespace tervane

@@ -24,6 +24,7 @@
 #include <QTextBrowser>
 #include <QToolButton>
 #include <QWidgetAction>
+#include <algorithm>
 
 #include "pages/document/help_pages.h"
 #include "pages/plots.h"
@@ -415,6 +416,8 @@ class ShownWidget : public ControlWidget {
     const QString value = Translated(Described().Text());
     const bool bearsLabel = Described().beside && !Described().label.empty();
     value_->setText(bearsLabel ? QString("%1: %2").arg(Translated(Described().label), value) : value);
+    // Several lines are a text to be read, however narrow the page is.
+    value_->setWordWrap(value.contains('\n'));
   }
 
  private:
@@ -769,11 +772,11 @@ void ControlWidget::SyncMessage() {
 void ControlWidget::SyncFindings() {
   if (!mark_) return;
   QString texts;
-  Severity worst = Severity::Warning;
+  Severity worst = Severity::Note;
   if (control_.node && !control_.key.empty()) {
     for (const Finding& finding : control_.node->Findings()) {
       if (finding.key != control_.key) continue;
-      if (finding.severity == Severity::Error) worst = Severity::Error;
+      worst = std::min(worst, finding.severity);
       texts += (texts.isEmpty() ? "" : "\n") + Translated(finding.text);
       if (!finding.detail.empty()) texts += "\n" + ToQt(finding.detail);
     }
@@ -782,7 +785,7 @@ void ControlWidget::SyncFindings() {
   if (texts.isEmpty()) return;
   mark_->setToolTip(texts);
   mark_->setAccessibleName(texts);
-  const QString icon = worst == Severity::Error ? "error" : "warning";
+  const QString icon = ToQt(std::string(NameOf(worst)));
   mark_->setPixmap(Theme::Get().Icon(icon).pixmap(mark_->size()));
 }
 

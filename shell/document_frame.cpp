@@ -203,6 +203,11 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
   context.displayUnits = &program_.Units();
   context.isReplacement = isRebuilding_;
   context.openDataFile = [this](const std::string& path) { emit DataFileWanted(ToQt(path)); };
+  context.syncSoon = [this] {
+    QTimer::singleShot(0, this, [this] {
+      if (page_) page_->Sync();
+    });
+  };
   context.selectNode = [this](const CYbSEKvfBase& other) {
     QTimer::singleShot(0, this, [this, serial = other.Serial()] { GoTo(serial); });
   };
@@ -272,8 +277,10 @@ std::string DocumentFrame::CurrentPath() const {
 
 void DocumentFrame::LeaveGoneNode() {
   if (!current_ || SelectInTrees(current_)) return;
+  // Some pages stand in no tree and are reached by a command alone.
   CYbSEKvfBase* node = NodeOf(current_);
-  if (node && node->IsDlgUsedInSetup() == 0 && session_->Document().Root().GetImportantNode("OVERVIEW") == node) return;
+  for (const char* name : {"OVERVIEW", "COVERAGE"})
+    if (node && session_->Document().Root().GetImportantNode(name) == node) return;
   for (const std::uint64_t serial : std::vector(above_))
     if (trees_.front()->Select(serial) && GoTo(serial)) return;
   if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));

@@ -43,6 +43,11 @@ CViewSettingsKvf& ViewSettingsOf(const DocumentFrame& frame) {
   return *frame.Session().Document().Root().Important<CViewSettingsKvf>("VIEWSETTINGS");
 }
 
+/// Shows the page of a node that stands in no tree.
+void GoToImportant(DocumentFrame& frame, const char* name) {
+  if (const CYbSEKvfBase* node = frame.Session().Document().Root().GetImportantNode(name)) frame.GoTo(node->Serial());
+}
+
 bool HasWaterQuality(const DocumentFrame& frame) {
   const auto* components = frame.Session().Document().Root().Important<CModelCompKvf>("MODELCOMP");
   return components && components->WQ != 0;
@@ -102,6 +107,9 @@ void MainWindow::BuildMenus() {
   BuildEditMenu();
   BuildViewMenu();
   BuildRunMenu();
+  QMenu* tools = menuBar()->addMenu(tr("&Tools"));
+  AddForDocument(tools, tr("Data &Coverage"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_D),
+                 [](DocumentFrame& frame) { GoToImportant(frame, "COVERAGE"); });
   windowMenu_ = menuBar()->addMenu(tr("&Window"));
   connect(windowMenu_, &QMenu::aboutToShow, this, &MainWindow::FillWindowMenu);
   // Filled when it is opened; the keys work without that.
@@ -168,10 +176,8 @@ void MainWindow::BuildViewMenu() {
   Command& forward = AddForDocument(view, tr("&Forward"), "forward", QKeySequence(Qt::ALT | Qt::Key_Right),
                                     [](DocumentFrame& frame) { frame.Go(1); });
   forward.enabled = [this] { return Frame() && Frame()->CanGo(1); };
-  AddForDocument(view, tr("&Overview"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_I), [](DocumentFrame& frame) {
-    if (const CYbSEKvfBase* overview = frame.Session().Document().Root().GetImportantNode("OVERVIEW"))
-      frame.GoTo(overview->Serial());
-  });
+  AddForDocument(view, tr("&Overview"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_I),
+                 [](DocumentFrame& frame) { GoToImportant(frame, "OVERVIEW"); });
   view->addSeparator();
   AddForDocument(view, tr("Next F&inding"), nullptr, QKeySequence(Qt::Key_F8),
                  [](DocumentFrame& frame) { frame.StepFinding(1); });

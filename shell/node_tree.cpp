@@ -39,7 +39,8 @@ class MarkedRowDelegate : public RowDelegate {
 Mark OwnMark(const CYbSEKvfBase& node) {
   Mark mark = kNoMark;
   for (const Finding& finding : node.Findings())
-    mark = std::max(mark, finding.severity == Severity::Error ? kError : kWarning);
+    if (finding.severity != Severity::Note)
+      mark = std::max(mark, finding.severity == Severity::Error ? kError : kWarning);
   return mark;
 }
 

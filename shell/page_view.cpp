@@ -27,6 +27,12 @@ constexpr int kMostFindings = 4;  ///< Lines below a form; the tab of findings h
 
 enum Column { kLabelColumn, kFieldColumn };
 
+QString SeverityText(Severity severity) {
+  return severity == Severity::Error     ? PageView::tr("Error")
+         : severity == Severity::Warning ? PageView::tr("Warning")
+                                         : PageView::tr("Note");
+}
+
 }  // namespace
 
 struct PageView::Form {
@@ -314,12 +320,13 @@ void PageView::SyncFindings() {
   int count = 0;
   const auto add = [&](const Finding& finding) {
     if (++count > kMostFindings) return;
-    const bool isError = finding.severity == Severity::Error;
-    const QColor color = isError ? theme.ErrorColor() : theme.WarningColor();
+    const QColor color = finding.severity == Severity::Error     ? theme.ErrorColor()
+                         : finding.severity == Severity::Warning ? theme.WarningColor()
+                                                                 : theme.QuietColor();
     QString text = Translated(finding.text).toHtmlEscaped().replace("\n", "<br>");
     if (!finding.detail.empty()) text += " — " + ToQt(finding.detail).toHtmlEscaped();
     lines += QString("<div><b style='color:%1'>%2</b>&nbsp; %3</div>")
-                 .arg(color.name(), isError ? tr("Error") : tr("Warning"), text);
+                 .arg(color.name(), SeverityText(finding.severity), text);
   };
   for (const Finding& finding : page_.Node().Findings()) add(finding);
   if (count > kMostFindings) lines += "<div>" + tr("and %n more", nullptr, count - kMostFindings) + "</div>";

@@ -29,8 +29,21 @@ int TableModel::columnCount(const QModelIndex& parent) const {
   return parent.isValid() ? 0 : static_cast<int>(Table().Columns().size());
 }
 
+QStringList TableModel::Heads() const {
+  QStringList heads;
+  for (int column = 1; column <= columnCount(); ++column) heads << ToQt(Table().Head(column));
+  return heads;
+}
+
 void TableModel::Sync() {
   const int rows = Table().RowCount();
+  if (Table().IsShownOnly() && heads_ != Heads()) {
+    beginResetModel();
+    heads_ = Heads();
+    rows_ = rows;
+    endResetModel();
+    return;
+  }
   if (rows > rows_) {
     beginInsertRows({}, rows_, rows - 1);
     rows_ = rows;
@@ -58,7 +71,22 @@ QVariant TableModel::data(const QModelIndex& index, int role) const {
       if (kind == CellKind::Check) return Table().Cell(row, column) == "1" ? Qt::Checked : Qt::Unchecked;
       return {};
     case Qt::ToolTipRole:
-      return Translated(Table().ToolTip(column));
+      // What does not fit into its cell is read here.
+      return Table().IsShownOnly() ? ToQt(Table().ShownCell(row, column)) : Translated(Table().ToolTip(column));
+    case Qt::DecorationRole: {
+      const std::string icon = Table().Icon(row, column);
+      return icon.empty() ? QVariant() : QVariant(Theme::Get().Icon(icon.c_str()));
+    }
+    case Qt::FontRole:
+      if (Table().IsLink(row, column)) {
+        QFont font = QApplication::font();
+        font.setUnderline(true);
+        return font;
+      }
+      return {};
+    case Qt::ForegroundRole:
+      if (Table().IsLink(row, column)) return QApplication::palette().link();
+      return {};
     case Qt::TextAlignmentRole: {
       const bool isNumber = kind == CellKind::Number || kind == CellKind::Integer;
       return static_cast<int>(Qt::AlignVCenter | (isNumber ? Qt::AlignRight : Qt::AlignLeft));
@@ -183,6 +211,8 @@ class CellDelegate : public QStyledItemDelegate {
 
 // ---- View
 
+constexpr int kTableWidth = 540;  ///< Of a table that is only shown, so that it can be read beside a map.
+
 TableView::TableView(CYbSEDlgBase& page, Control& control) : page_(page), control_(control) {
   const Theme& theme = Theme::Get();
   auto* all = new QVBoxLayout(this);
@@ -232,8 +262,8 @@ TableView::TableView(CYbSEDlgBase& page, Control& control) : page_(page), contro
   view_->verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
   view_->horizontalHeader()->setStretchLastSection(true);
   view_->horizontalHeader()->setDefaultAlignment(Qt::AlignLeft | Qt::AlignVCenter);
-  for (int column = 0; column < model_->columnCount(); ++column)
-    view_->setColumnWidth(column, theme.Scaled(control.table->Columns()[static_cast<std::size_t>(column)].width));
+  FitColumns();
+  connect(model_, &QAbstractItemModel::modelReset, this, &TableView::FitColumns);
   all->addWidget(view_, 1);
 
   const auto action = [this](const QString& text, const QKeySequence& keys, auto operation) {
@@ -253,6 +283,17 @@ TableView::TableView(CYbSEDlgBase& page, Control& control) : page_(page), contro
   connect(view_->horizontalHeader(), &QWidget::customContextMenuRequested, this, [this](const QPoint& place) {
     OfferUnits(view_->horizontalHeader()->logicalIndexAt(place), view_->horizontalHeader()->mapToGlobal(place));
   });
+  if (control.table->IsShownOnly()) {
+    for (QToolButton* change : {insert_, delete_, up_, down_}) change->hide();
+    message_->hide();
+    view_->setSelectionBehavior(QAbstractItemView::SelectRows);
+    view_->setMinimumWidth(theme.Scaled(kTableWidth));
+    view_->verticalHeader()->hide();
+    connect(view_, &QTableView::clicked, this,
+            [this](const QModelIndex& index) { control_.table->Press(index.row() + 1, index.column() + 1); });
+    connect(view_->selectionModel(), &QItemSelectionModel::currentRowChanged, this,
+            [this](const QModelIndex& current) { control_.table->Choose(current.row() + 1); });
+  }
   SyncButtons();
 }
 
@@ -261,7 +302,8 @@ QWidget* TableView::FocusTarget() const { return view_; }
 void TableView::Sync() {
   model_->Sync();
   message_->clear();
-  if (!view_->currentIndex().isValid() && model_->rowCount() > 0)
+  // What is only shown is chosen by the user alone.
+  if (!control_.table->IsShownOnly() && !view_->currentIndex().isValid() && model_->rowCount() > 0)
     view_->selectionModel()->setCurrentIndex(model_->index(0, 0), QItemSelectionModel::NoUpdate);
   SyncButtons();
 }
@@ -367,6 +409,12 @@ bool TableView::eventFilter(QObject* watched, QEvent* event) {
   const bool isPress = event->type() == QEvent::KeyPress || event->type() == QEvent::ShortcutOverride;
   if (watched == view_ && (isPress || event->type() == QEvent::KeyRelease)) {
     const auto* keys = static_cast<QKeyEvent*>(event);
+    const bool isReturn = keys->key() == Qt::Key_Return || keys->key() == Qt::Key_Enter;
+    if (event->type() == QEvent::KeyPress && isReturn && control_.table->IsShownOnly()) {
+      const QModelIndex current = view_->currentIndex();
+      for (int column = 1; column <= model_->columnCount(); ++column)
+        if (control_.table->Press(current.row() + 1, column)) return true;
+    }
     if (keys->modifiers() & Qt::ControlModifier) {
       std::optional<RowAction> action;
       if (keys->key() == Qt::Key_Insert) action = RowAction::Insert;
@@ -386,14 +434,23 @@ bool TableView::eventFilter(QObject* watched, QEvent* event) {
 
 void TableView::resizeEvent(QResizeEvent* event) {
   QWidget::resizeEvent(event);
-  if (hasFittedColumns_ || !isVisible()) return;
-  hasFittedColumns_ = true;
-  // Columns that do not fit begin narrower; from then on they are the user's.
-  const int room = view_->viewport()->width();
-  const int wanted = view_->horizontalHeader()->length();
-  if (wanted <= room) return;
-  for (int column = 0; column < model_->columnCount(); ++column)
-    view_->setColumnWidth(column, std::max(Theme::Get().Scaled(50), view_->columnWidth(column) * room / wanted));
+  if (hasFittedColumns_ || (!isVisible() && !control_.table->IsShownOnly())) return;
+  // Columns that do not fit begin narrower; from then on they are the user's. What is only shown follows its room.
+  hasFittedColumns_ = !control_.table->IsShownOnly();
+  FitColumns();
+}
+
+void TableView::FitColumns() {
+  // The view itself is laid out later.
+  const int edges = 2 * view_->frameWidth() + style()->pixelMetric(QStyle::PM_ScrollBarExtent);
+  const int room = control_.table->IsShownOnly() ? width() - edges : view_->viewport()->width();
+  int wanted = 0;
+  for (const TableColumn& column : control_.table->Columns()) wanted += Theme::Get().Scaled(column.width);
+  const double share = wanted > room ? static_cast<double>(room) / wanted : 1;
+  for (int column = 0; column < model_->columnCount(); ++column) {
+    const int width = Theme::Get().Scaled(control_.table->Columns()[static_cast<std::size_t>(column)].width);
+    view_->setColumnWidth(column, std::max(Theme::Get().Scaled(50), static_cast<int>(width * share)));
+  }
 }
 
 void TableView::OfferUnits(int column, const QPoint& place) {

@@ -19,7 +19,8 @@ class TableModel : public QAbstractTableModel {
   Q_OBJECT
 
  public:
-  TableModel(CYbSEDlgBase& page, Control& control) : page_(page), control_(control), rows_(Table().RowCount()) {}
+  TableModel(CYbSEDlgBase& page, Control& control)
+      : page_(page), control_(control), rows_(Table().RowCount()), heads_(Heads()) {}
 
   TableForm& Table() const { return *control_.table; }
   /// Follows the list, also in its number of rows.
@@ -35,9 +36,12 @@ class TableModel : public QAbstractTableModel {
   Qt::ItemFlags flags(const QModelIndex& index) const override;
 
  private:
+  QStringList Heads() const;
+
   CYbSEDlgBase& page_;
   Control& control_;
   int rows_;
+  QStringList heads_;  ///< Of the columns that views know.
   QString refusal_;
 };
 
@@ -77,6 +81,7 @@ class TableView : public QWidget {
   void ChangeRowOfCurrentCell(RowAction action);
   void Tell(const CellsResult& result, const QString& done);
   void SyncButtons();
+  void FitColumns();
   void OfferUnits(int column, const QPoint& place);
 
   CYbSEDlgBase& page_;

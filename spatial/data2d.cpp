@@ -7,6 +7,7 @@
 
 #include <fmt/format.h>
 
+#include "platform/file_cache.h"
 #include "platform/grid_polygons.h"
 #include "platform/paths.h"
 #include "platform/units.h"
@@ -34,17 +35,18 @@ InterpolationOptions OnAllCores(ProgressPart progress) {
 
 }  // namespace
 
-FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work, CTvn2DOrthoRotatedGridData& grid) {
+FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid) {
   // The file's own geometry counts; nothing is resampled.
-  if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid, work.progress);
+  if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid, progress);
   const bool isXyz = source.type == CData2DKvf::kXyzFile;
   if (source.itemType == kCodeItemType && !isXyz) {
     PolygonFile polygons;
     polygons.path = source.file;
     polygons.attribute = source.attribute;
     polygons.axisUnit = source.axisUnit;
+    polygons.gapFill = source.gapFill;
     ZoneTable zones;
-    return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, work.progress);
+    return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, progress);
   }
   ScatteredFile points;
   points.path = source.file;
@@ -53,10 +55,33 @@ FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work,
   points.axisUnit = source.axisUnit;
   points.itemUnit = source.itemUnit;
   points.itemType = source.itemType;
-  InterpolationOptions options = work;
+  InterpolationOptions options = OnAllCores(progress);
   options.method = static_cast<InterpolationMethod>(source.interpMethod);
   options.searchRadius = source.searchRadius;
   return grid.CreateGridData_GIS(source.geometry, kUsualDeleteValue, points, options);
+}
+
+GridSource CodesOfGrid(const CTvnData2DNdsFile& file) {
+  GridSource source;
+  source.type = CData2DKvf::kGridFile;
+  source.file = file.File.Absolute();
+  source.stamps = StampsOf(source.file);
+  source.item = file.SelectedItem();
+  source.itemType = kCodeItemType;
+  return source;
+}
+
+GridSource CodesOfPolygons(const CData2DShpFile& file, int axisUnit, std::string gapFill) {
+  GridSource source;
+  source.type = CData2DKvf::kShapeFile;
+  source.file = file.File.Absolute();
+  source.stamps = StampsOfShape(source.file);
+  source.attribute = file.Attribute();
+  source.axisUnit = axisUnit;
+  source.itemType = kCodeItemType;
+  source.gapFill = std::move(gapFill);
+  if (const auto* domain = file.Important<CCatchmentKvf>("CATCHMENT")) source.geometry = domain->GetModelGeometry();
+  return source;
 }
 
 CData2DKvf::CData2DKvf(Data2DKind kind, CYbSEKvfBase* parent)
@@ -74,6 +99,8 @@ CData2DKvf::CData2DKvf(Data2DKind kind, CYbSEKvfBase* parent)
   shapeFile_->SetLineShape(!IsCode());
   shapeFile_->SetPointShape(!IsCode());
   IsCode() ? shapeFile_->UseWholeField() : shapeFile_->UseRealField();
+  shapeFile_->SetAxisUnit(ShapeAxisUnit);
+  xyzFile_->SetAxisUnit(ShapeAxisUnit);
   ValidateData();
 }
 
@@ -99,6 +126,7 @@ int CData2DKvf::ValidateData() {
   gridFile_->SetItemType(GetItemType());
   gridFile_->SetFileUsed(Type == kGridFile);
   shapeFile_->SetValidateFlag(Type == kShapeFile);
+  xyzFile_->SetFileUsed(Type == kXyzFile);
   return 1;
 }
 
@@ -112,7 +140,7 @@ GridSource CData2DKvf::CurrentSource() const {
   if (Type == kUniform) return source;
   const FileName& file = Type == kGridFile ? gridFile_->File : Type == kShapeFile ? shapeFile_->File : xyzFile_->File;
   source.file = file.Absolute();
-  source.stamp = StampOf(source.file);
+  source.stamps = Type == kShapeFile ? StampsOfShape(source.file) : StampsOf(source.file);
   if (Type == kGridFile) {
     source.item = gridFile_->SelectedItem();
     return source;
@@ -131,7 +159,7 @@ std::shared_ptr<CTvn2DOrthoRotatedGridData> CData2DKvf::CreateGridData(std::stri
   const GridSource source = CurrentSource();
   if (source.type == kUniform) return nullptr;
   auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
-  const FileResult result = BuildGrid(source, OnAllCores({}), *grid);
+  const FileResult result = BuildGrid(source, {}, *grid);
   if (problem) *problem = result.error;
   if (!result.Ok()) return nullptr;
   if (source.type == kShapeFile) grid->SetItemName(GetTitle());
@@ -146,7 +174,7 @@ std::shared_ptr<ComputedGrid> CData2DKvf::GridComputation() {
     const std::string name = source.type == kShapeFile ? GetTitle() : std::string();
     auto made = std::make_shared<ComputedGrid>(fmt::format("{} {}", verb, FileNameOf(source.file)),
                                                [source, name](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
-                                                 FileResult result = BuildGrid(source, OnAllCores(progress), grid);
+                                                 FileResult result = BuildGrid(source, progress, grid);
                                                  if (!name.empty()) grid.SetItemName(name);
                                                  return result;
                                                });

@@ -13,6 +13,7 @@
 #include "platform/grid.h"
 #include "platform/grid_files.h"
 #include "platform/grid_interpolation.h"
+#include "spatial/data_use.h"
 #include "spatial/file_nodes.h"
 
 namespace tervane {
@@ -27,25 +28,15 @@ struct Data2DKind {
   bool mayBeScattered = true;  ///< Whether shape and XYZ files are offered.
 };
 
-/// All that decides what grid a quantity has; grids of equal sources are equal.
-struct GridSource {
-  int type = 0;
-  std::string file;
-  FileStamp stamp;
-  int item = 1;
-  std::string attribute;
-  int interpMethod = 0;
-  float searchRadius = 0;
-  int axisUnit = 0, itemUnit = 0, itemType = 0;
-  GridGeometry geometry;
-
-  bool operator==(const GridSource&) const = default;
-};
-
 /// Makes the grid of a source; it asks no node, so that another thread may do it. `grid` stays as it was on failure.
-FileResult BuildGrid(const GridSource& source, const InterpolationOptions& work, CTvn2DOrthoRotatedGridData& grid);
+FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid);
 
-class CData2DKvf : public CTvnKvfBase {
+/// The source of the codes in a grid file.
+GridSource CodesOfGrid(const CTvnData2DNdsFile& file);
+/// The source of codes on the model's grid by the polygons of a file. `gapFill` is the value outside all of them.
+GridSource CodesOfPolygons(const CData2DShpFile& file, int axisUnit, std::string gapFill);
+
+class CData2DKvf : public CTvnKvfBase, public CellValues {
  public:
   CData2DKvf(Data2DKind kind, CYbSEKvfBase* parent);
 
@@ -75,11 +66,10 @@ class CData2DKvf : public CTvnKvfBase {
   /// The name of the selected item of the grid file; empty when it cannot be read.
   std::string GetNdsItemName() const;
 
-  /// What decides the grid now.
-  GridSource CurrentSource() const;
+  GridSource CurrentSource() const override;
   /// The building of the grid: another one when what decides the grid has changed; null for a uniform value. It asks no
   /// node.
-  std::shared_ptr<ComputedGrid> GridComputation();
+  std::shared_ptr<ComputedGrid> GridComputation() override;
   /// The grid, built here and now if it is not there yet; null for a uniform value and where it cannot be built, and
   /// then `problem` says why.
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> GetGridData(std::string* problem = nullptr);

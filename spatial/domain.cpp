@@ -21,6 +21,8 @@ CCatchmentKvf::CCatchmentKvf(CYbSEKvfBase* parent)
       gridFile_(NewChild<CTvnData2DNdsFile>(kCodeItemType)),
       shapeFile_(NewChild<CData2DShpFile>()) {
   SetPage(kCatchmentPage);
+  gridFile_->SetDomainCheck(0);
+  shapeFile_->SetAxisUnit(ShapeAxisUnit);
   shapeFile_->SetPolygonShape(1);
   shapeFile_->SetValidateFlag(0);
 }
@@ -35,6 +37,12 @@ void CCatchmentKvf::ExchangeKeys(KeyExchange& keys) {
   keys("MapProjShp", MapProjShp);
   keys("rotationShp", rotationShp);
   keys("ShapeAxisUnit", ShapeAxisUnit);
+}
+
+bool CCatchmentKvf::HasGeometry() const {
+  if (Type == kShapeFile) return !shapeFile_->File.IsEmpty();
+  GridGeometry geometry;
+  return ReadGeoInfoFromNdsFile(gridFile_->File.Absolute(), gridFile_->SelectedItem(), geometry).Ok();
 }
 
 GridGeometry CCatchmentKvf::GetModelGeometry() const {
@@ -61,7 +69,7 @@ std::shared_ptr<CTvn2DOrthoRotatedGridData> CCatchmentKvf::GetDomainFromShape(st
 
 CCatchmentKvf::ShapeSource CCatchmentKvf::CurrentShape() const {
   const std::string file = shapeFile_->File.Absolute();
-  return {file, StampOf(file), ShapeAxisUnit, {nxShp, nyShp, sizeShp, x0Shp, y0Shp, rotationShp, MapProjShp}};
+  return {file, StampsOfShape(file), ShapeAxisUnit, {nxShp, nyShp, sizeShp, x0Shp, y0Shp, rotationShp, MapProjShp}};
 }
 
 FileResult CCatchmentKvf::BuildFromShape(const ShapeSource& source, ProgressPart progress,
@@ -135,7 +143,10 @@ int CCatchmentKvf::ValidateData() {
     }
   }
   if (auto* maps = dynamic_cast<DomainFollower*>(ImportantNode("OVERLAY_DATA"))) maps->AdoptDomain(GetEnvelope());
-  const std::string projection = GetModelGeometry().projection;
+  const GridGeometry geometry = GetModelGeometry();
+  if (const std::string problem = geometry.Problem(); !problem.empty())
+    AddWarning("The grid of the model cannot be made", Type == kShapeFile ? "nxShp" : "FILE_NAME", problem);
+  const std::string& projection = geometry.projection;
   if (CYbMapProjection(projection).IsGeographical()) {
     AddError(projection + " is not supported by Tervane. Only projected coordinate systems are allowed", "MapProjShp");
     return 0;

@@ -39,6 +39,8 @@ class CCatchmentKvf : public CTvnKvfBase {
   CTvnData2DNdsFile& GridFile() const { return *gridFile_; }
   CData2DShpFile& ShapeFile() const { return *shapeFile_; }
 
+  /// False while no file that can be read tells where the model lies.
+  bool HasGeometry() const;
   /// The grid on which the model works; without a readable file 50 by 50 cells of 1000 m at the origin.
   GridGeometry GetModelGeometry() const;
   /// The smallest axis-parallel rectangle around it.
@@ -64,7 +66,7 @@ class CCatchmentKvf : public CTvnKvfBase {
   /// All that decides the domain of a shape file.
   struct ShapeSource {
     std::string file;
-    FileStamp stamp;
+    std::vector<FileStamp> stamps;
     int axisUnit = 0;
     GridGeometry geometry;
 

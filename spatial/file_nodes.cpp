@@ -2,8 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "spatial/file_nodes.h"
 
+#include "platform/file_cache.h"
 #include "platform/units.h"
 #include "simspec/periods.h"
+#include "spatial/placement.h"
 
 namespace tervane {
 
@@ -11,6 +13,12 @@ namespace {
 
 constexpr const char* kNotValid = "File is not valid";
 constexpr const char* kNoFile = "no file is chosen";
+
+/// What a user should know of where a valid file lies.
+std::vector<Finding> MisplacementOf(const CYbSEKvfBase& node, const FileUse& use) {
+  const std::optional<GridGeometry> domain = use.isOverArea ? DomainGeometryOf(node) : std::nullopt;
+  return domain ? FindMisplacement(PlaceOf(use), *domain) : std::vector<Finding>();
+}
 
 }  // namespace
 
@@ -47,7 +55,19 @@ int DataFileNode::ValidateData() {
   if (ChecksPeriod())
     if (const std::string reason = WhyNotMet(path, Items, WithSimulationPeriod(request)); !reason.empty())
       AddWarning("The file does not cover the simulation", "FILE_NAME", reason);
+  for (Finding& finding : MisplacementOf(*this, *UsedFile())) AddFinding(std::move(finding));
   return 1;
+}
+
+std::optional<FileUse> DataFileNode::UsedFile() const {
+  if (FileUsed == 0) return std::nullopt;
+  FileUse use;
+  use.path = File.IsEmpty() ? std::string() : File.Absolute();
+  use.stamps = StampsOf(use.path);
+  use.item = SelectedItem();
+  use.isOverTime = ChecksPeriod();
+  use.isOverArea = DomainCheck != 0 && dimensions_ >= 2;
+  return use;
 }
 
 CTvnData2DNdsFile::CTvnData2DNdsFile(int itemType, CYbSEKvfBase* parent)
@@ -69,10 +89,39 @@ void CData2DShpFile::Choose(FileName file, std::string attribute) {
 
 int CData2DShpFile::ValidateData() {
   if (ValidateFlag == 0) return 1;
-  const std::string reason = File.IsEmpty() ? kNoFile : CheckShapeFile(File.Absolute(), request_, Attribute()).error;
-  if (reason.empty()) return 1;
-  AddError(kNotValid, "FILE_NAME", reason);
-  return 0;
+  const FileResult checked =
+      File.IsEmpty() ? FileResult{kNoFile, {}} : CheckShapeFile(File.Absolute(), request_, Attribute());
+  if (!checked.Ok()) {
+    AddError(kNotValid, "FILE_NAME", checked.error);
+    return 0;
+  }
+  if (!checked.note.empty())
+    AddFinding({Severity::Note, "The file was read with reservations", "FILE_NAME", checked.note});
+  for (Finding& finding : MisplacementOf(*this, *UsedFile())) AddFinding(std::move(finding));
+  return 1;
+}
+
+std::optional<FileUse> CData2DShpFile::UsedFile() const {
+  if (ValidateFlag == 0) return std::nullopt;
+  FileUse use;
+  use.kind = FileUse::Kind::Shape;
+  use.path = File.IsEmpty() ? std::string() : File.Absolute();
+  use.stamps = StampsOfShape(use.path);
+  use.attribute = Attribute();
+  if (axisUnit_) use.axisUnit = *axisUnit_;
+  use.isOverArea = true;
+  return use;
+}
+
+std::optional<FileUse> CData2DXyzFile::UsedFile() const {
+  if (fileUsed_ == 0) return std::nullopt;
+  FileUse use;
+  use.kind = FileUse::Kind::Points;
+  use.path = File.IsEmpty() ? std::string() : File.Absolute();
+  use.stamps = StampsOf(use.path);
+  if (axisUnit_) use.axisUnit = *axisUnit_;
+  use.isOverArea = true;
+  return use;
 }
 
 void CData2DXyzFile::ExchangeKeys(KeyExchange& keys) {

@@ -5,27 +5,31 @@
 // not in use is never an error.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "core/file_selection.h"
 #include "platform/datafile_request.h"
 #include "platform/shapes.h"
+#include "spatial/data_use.h"
 
 namespace tervane {
 
 /// A node over a file of grids or time series.
-class DataFileNode : public YbSENdsSelection {
+class DataFileNode : public YbSENdsSelection, public FileUser {
  public:
   DataFileNode(std::string title, std::string section, int dimensions, CYbSEKvfBase* parent)
       : YbSENdsSelection(std::move(title), std::move(section), parent), dimensions_(dimensions) {}
 
   int FileUsed = 1;            ///< Not stored: what the owner says. 0 switches the validation off.
+  int DomainCheck = 1;         ///< Not stored: a file of grids is to lie where the model domain lies.
   std::vector<int> ItemTypes;  ///< Not stored: what the selected item may be; empty for anything.
 
   void SetItemType(int itemType);
   void SetMultiItemTypes(std::vector<int> itemTypes) { ItemTypes = std::move(itemTypes); }
   void SetFileUsed(int used) { FileUsed = used; }
+  void SetDomainCheck(int check) { DomainCheck = check; }
 
   /// The number of the selected item; item 1 where none is selected.
   int SelectedItem() const { return Items.empty() ? 1 : Items.front(); }
@@ -39,8 +43,10 @@ class DataFileNode : public YbSENdsSelection {
   virtual DataFileRequest SetUpNdsValidation() const;
   /// The same with the period that a chosen file must cover.
   virtual DataFileRequest SelectionRequest() const { return SetUpNdsValidation(); }
-  /// "File is not valid" with the reason behind it; a warning where a usable file does not cover the simulation.
+  /// "File is not valid" with the reason behind it; warnings where a usable file does not cover the simulation, or does
+  /// not lie where the model domain lies.
   int ValidateData() override;
+  std::optional<FileUse> UsedFile() const override;
 
  protected:
   /// The request with the simulation's period in it.
@@ -100,13 +106,15 @@ class CUZData3DNdsFile : public DataFileNode {
 };
 
 /// A shape file and the one attribute that was chosen in it.
-class CData2DShpFile : public YbSEShpSelection {
+class CData2DShpFile : public YbSEShpSelection, public FileUser {
  public:
   explicit CData2DShpFile(CYbSEKvfBase* parent) : YbSEShpSelection("Shape file", "SHAPE_FILE", parent) {}
 
   int ValidateFlag = 1;  ///< Not stored; 0 switches the validation off.
 
   void SetValidateFlag(int validate) { ValidateFlag = validate; }
+  /// The owner's key of the unit of coordinates; metres where none is told.
+  void SetAxisUnit(const int& unit) { axisUnit_ = &unit; }
   void SetPolygonShape(int accepted) { request_.polygons = accepted != 0; }
   void SetLineShape(int accepted) { request_.lines = accepted != 0; }
   void SetPointShape(int accepted) { request_.points = accepted != 0; }
@@ -120,20 +128,30 @@ class CData2DShpFile : public YbSEShpSelection {
 
   const ShapeRequest& Request() const { return request_; }
   int ValidateData() override;
+  std::optional<FileUse> UsedFile() const override;
 
  private:
   ShapeRequest request_;
+  const int* axisUnit_ = nullptr;
 };
 
 /// A text file of points. It has no validation: what is wrong with it is told where it is read.
-class CData2DXyzFile : public CTvnKvfBase {
+class CData2DXyzFile : public CTvnKvfBase, public FileUser {
  public:
   explicit CData2DXyzFile(CYbSEKvfBase* parent) : CTvnKvfBase("XYZ file", "XYZ_FILE", parent) {}
 
   FileName File;
 
+  void SetFileUsed(int used) { fileUsed_ = used; }
+  void SetAxisUnit(const int& unit) { axisUnit_ = &unit; }
+  std::optional<FileUse> UsedFile() const override;
+
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  int fileUsed_ = 0;
+  const int* axisUnit_ = nullptr;
 };
 
 }  // namespace tervane

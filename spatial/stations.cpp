@@ -6,7 +6,9 @@
 #include <unordered_set>
 
 #include "core/list.h"
+#include "platform/file_cache.h"
 #include "platform/units.h"
+#include "spatial/data2d.h"
 #include "spatial/pages.h"
 
 namespace tervane {
@@ -14,6 +16,23 @@ namespace tervane {
 namespace {
 
 constexpr int kPrecipitationDepth = 100004;  ///< What a file of any forcing may hold besides its own quantity.
+
+/// A file over time, of a forcing as a whole or of one of its stations.
+ForcingSeries SeriesOf(const DataFileNode& file) {
+  ForcingSeries series;
+  series.path = file.File.IsEmpty() ? std::string() : file.File.Absolute();
+  series.stamps = StampsOf(series.path);
+  series.item = file.SelectedItem();
+  return series;
+}
+
+/// A value or a series.
+ForcingSeries SeriesOf(int type, float value, const DataFileNode& file) {
+  if (type == CGlobalKvf::kTimeVarying) return SeriesOf(file);
+  ForcingSeries series;
+  series.constant = static_cast<double>(value);
+  return series;
+}
 
 }  // namespace
 
@@ -39,6 +58,12 @@ CStationBasedKvf::CStationBasedKvf(CFMSEKvfBase* parent)
   gridFile_->SetFileUsed(0);
   shapeFile_->SetValidateFlag(0);
   shapeFile_->SetPolygonShape(1);
+  shapeFile_->SetAxisUnit(ShapeAxisUnit);
+}
+
+GridSource CStationBasedKvf::CurrentSource() const {
+  return TYPE == kGridCodes ? CodesOfGrid(*gridFile_)
+                            : CodesOfPolygons(*shapeFile_, ShapeAxisUnit, IdOfItem(owner_, ShapeGapFillName));
 }
 
 void CStationBasedKvf::ExchangeKeys(KeyExchange& keys) {
@@ -183,6 +208,30 @@ CFMSEKvfGroupBase* C2DStationBasedDataKvf::SelectStationByName(const std::string
   return nullptr;
 }
 
+Forcing C2DStationBasedDataKvf::CurrentForcing() const {
+  Forcing forcing;
+  forcing.title = GetTitle();
+  forcing.itemType = GetItemType();
+  if (DistributionType == kFullyDistributed) {
+    forcing.overGrid = SeriesOf(fully_->GridFile());
+    return forcing;
+  }
+  if (DistributionType != kStationBased) {
+    forcing.series.push_back(SeriesOf(global_->TYPE, global_->FIXED_VALUE, global_->SeriesFile()));
+    return forcing;
+  }
+  forcing.areas = stations_->CurrentSource();
+  for (const CFMSEKvfGroupBase* item : ZoneItems(*this)) {
+    const auto* station = dynamic_cast<const C2DStationBasedDataTimeSeriesKvf*>(item);
+    if (!station) continue;
+    ForcingSeries series = SeriesOf(station->TYPE, station->FIXED_VALUE, station->SeriesFile());
+    series.name = station->NAME;
+    series.id = station->GRIDCODEID;
+    forcing.series.push_back(std::move(series));
+  }
+  return forcing;
+}
+
 int C2DStationBasedDataKvf::IsDlgUsedInSetup() { return GetParent() ? GetParent()->IsDlgUsedInSetup() : 1; }
 
 int C2DStationBasedDataKvf::ValidateData() {
@@ -198,6 +247,14 @@ CTimeseriesConstKvf::CTimeseriesConstKvf(int itemType, CYbSEKvfBase* parent)
       itemType_(itemType),
       global_(NewChild<CGlobalKvf>("Global", "GLOBAL", std::vector{itemType})) {
   SetPage(kTimeseriesConstPage);
+}
+
+Forcing CTimeseriesConstKvf::CurrentForcing() const {
+  Forcing forcing;
+  forcing.title = GetTitle();
+  forcing.itemType = itemType_;
+  forcing.series.push_back(SeriesOf(global_->TYPE, global_->FIXED_VALUE, global_->SeriesFile()));
+  return forcing;
 }
 
 int CTimeseriesConstKvf::ValidateData() {

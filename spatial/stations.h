@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "platform/datafile.h"
+#include "spatial/data_use.h"
 #include "spatial/file_nodes.h"
 #include "spatial/zone_sync.h"
 
@@ -50,7 +51,7 @@ class CGlobalKvf : public CTvnKvfBase {
 };
 
 /// How the station areas are given. The stations themselves are children of its parent.
-class CStationBasedKvf : public CTvnKvfBase {
+class CStationBasedKvf : public CTvnKvfBase, public CellValues {
  public:
   explicit CStationBasedKvf(CFMSEKvfBase* parent);
 
@@ -63,6 +64,8 @@ class CStationBasedKvf : public CTvnKvfBase {
   CTvnData2DNdsFile& GridFile() const { return *gridFile_; }
   CData2DShpFile& ShapeFile() const { return *shapeFile_; }
 
+  /// Of the codes of the stations, whatever the distribution.
+  GridSource CurrentSource() const override;
   void ReadData(KvfNode* section) override;
 
  protected:
@@ -126,7 +129,7 @@ class C2DStationBasedDataTimeSeriesKvf : public CFMSEKvfGroupBase {
 };
 
 /// A forcing.
-class C2DStationBasedDataKvf : public CFMSEKvfBase {
+class C2DStationBasedDataKvf : public CFMSEKvfBase, public ForcingNode {
  public:
   /// A forcing of that quantity, or of precipitation depths.
   C2DStationBasedDataKvf(int itemType, std::string title, std::string section, CYbSEKvfBase* parent);
@@ -165,6 +168,7 @@ class C2DStationBasedDataKvf : public CFMSEKvfBase {
   CFMSEKvfGroupBase* SelectStationByName(const std::string& name) const;
   std::vector<std::string> GetStationNames() const { return ZoneItemTitles(*this); }
 
+  Forcing CurrentForcing() const override;
   int IsDlgUsedInSetup() override;
   int ValidateData() override;
 
@@ -188,12 +192,13 @@ class ForcingOf : public C2DStationBasedDataKvf {
 };
 
 /// A constant or a time series without anything spatial.
-class CTimeseriesConstKvf : public CTvnKvfBase {
+class CTimeseriesConstKvf : public CTvnKvfBase, public ForcingNode {
  public:
   CTimeseriesConstKvf(int itemType, CYbSEKvfBase* parent);
 
   int GetItemType() const { return itemType_; }
   CGlobalKvf& Global() const { return *global_; }
+  Forcing CurrentForcing() const override;
   int ValidateData() override;
 
  private:

@@ -179,6 +179,12 @@ std::vector<CFMSEKvfGroupBase*> ZoneItems(const CFMSEKvfBase& owner) {
   return items;
 }
 
+std::string IdOfItem(const CFMSEKvfBase& owner, const std::string& name) {
+  for (const CFMSEKvfGroupBase* item : ZoneItems(owner))
+    if (!name.empty() && item->GetStationName() == name) return item->GetStationId();
+  return {};
+}
+
 std::vector<std::string> ZoneItemTitles(const CFMSEKvfBase& owner) {
   std::vector<std::string> titles;
   for (const CFMSEKvfGroupBase* item : ZoneItems(owner)) titles.push_back(item->GetStationName());

@@ -90,6 +90,9 @@ SyncResult SyncItems(CFMSEKvfBase& owner, const FoundZones& found);
 /// Removes all children that stand for codes or values, and adds the one for the whole area, "Global".
 SyncResult MakeGlobalItem(CFMSEKvfBase& owner);
 
+/// The identity of the child of that name; empty when there is none.
+std::string IdOfItem(const CFMSEKvfBase& owner, const std::string& name);
+
 /// The children that stand for codes or values, in their order.
 std::vector<CFMSEKvfGroupBase*> ZoneItems(const CFMSEKvfBase& owner);
 std::vector<std::string> ZoneItemTitles(const CFMSEKvfBase& owner);

@@ -6,6 +6,7 @@
 
 #include "platform/units.h"
 #include "simspec/model_components.h"
+#include "spatial/data2d.h"
 #include "spatial/pages.h"
 
 namespace tervane {
@@ -52,6 +53,7 @@ CodedZonesKvf::CodedZonesKvf(std::string title, std::string section, const char*
   gridFile_->SetFileUsed(0);
   shapeFile_->SetValidateFlag(0);
   shapeFile_->SetPolygonShape(1);
+  shapeFile_->SetAxisUnit(ShapeAxisUnit);
 }
 
 void CodedZonesKvf::ExchangeKeys(KeyExchange& keys) {
@@ -84,6 +86,12 @@ ZoneFinder CodedZonesKvf::Finder() const {
   if (UsesPolygons()) return PolygonFinder(*shapeFile_, ShapeAxisUnit);
   if (UsesGridCodes()) return CodeFinder(*gridFile_);
   return [](ProgressPart) { return FoundZones(); };
+}
+
+GridSource CodedZonesKvf::CurrentSource() const {
+  if (UsesGridCodes()) return CodesOfGrid(*gridFile_);
+  if (UsesPolygons()) return CodesOfPolygons(*shapeFile_, ShapeAxisUnit, IdOfItem(*this, ShapeGapFillName));
+  return {};
 }
 
 SyncPlan CodedZonesKvf::PlanZones(const FoundZones& found) {

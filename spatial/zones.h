@@ -65,7 +65,7 @@ class CodedZoneProp : public CFMSEKvfGroupBase {
 };
 
 /// The parent of zones.
-class CodedZonesKvf : public CFMSEKvfBase {
+class CodedZonesKvf : public CFMSEKvfBase, public CellValues {
  public:
   /// `countKey` is the key of the number of zones.
   CodedZonesKvf(std::string title, std::string section, const char* countKey, CYbSEKvfBase* parent);
@@ -84,6 +84,8 @@ class CodedZonesKvf : public CFMSEKvfBase {
   bool UsesGridCodes() const { return DistributionType == kDistributed && Type == kGridCodes; }
   bool UsesPolygons() const { return DistributionType == kDistributed && Type == kPolygons; }
 
+  /// Of the codes of the zones.
+  GridSource CurrentSource() const override;
   /// What the source holds; nothing is asked for a uniform distribution.
   FoundZones FindZones() const { return Finder()({}); }
   ZoneFinder Finder() const;

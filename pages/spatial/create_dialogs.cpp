@@ -3,10 +3,12 @@
 #include "pages/spatial/create_dialogs.h"
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include "pages/spatial/plot_content.h"
 #include "platform/grid_files.h"
 #include "platform/paths.h"
+#include "platform/series_csv.h"
 #include "platform/series_file.h"
 #include "platform/text.h"
 #include "platform/units.h"
@@ -263,11 +265,17 @@ void CTvnCreate0DNdsDlg::Describe(PageForm& form) {
 std::string CTvnCreate0DNdsDlg::CreateFile() {
   constexpr std::size_t kMostSteps = 50'000'000;
   NewSeries series;
+  std::vector<std::string> notes;
   series.name = forNode_.GetTitle();
   series.itemType = itemTypes_[static_cast<std::size_t>(itemType_)];
   series.valueType = valueTypes_[static_cast<std::size_t>(valueType_)];
   if (!Trimmed(rows_).empty()) {
-    if (std::string problem = ParseSeriesText(rows_, series); !problem.empty()) return problem;
+    CsvSeries pasted = ReadPastedSeries(rows_);
+    if (!pasted.error.empty()) return pasted.error;
+    if (pasted.stamps.size() < 2) return "at least two rows with a date and a number were expected";
+    series.times = std::move(pasted.stamps);
+    series.values = std::move(pasted.values);
+    notes = std::move(pasted.notes);
   } else {
     if (!start_.IsValid() || !end_.IsValid() || end_ <= start_) return "the end date must lie behind the start date";
     const auto seconds = static_cast<std::int64_t>(stepHours_ * 3600.0 + 0.5);
@@ -282,9 +290,13 @@ std::string CTvnCreate0DNdsDlg::CreateFile() {
     series.values.assign(series.times.size(), static_cast<float>(value_));
   }
   if (!MayReplace(file_, Outside())) return kStay;
-  return Write(file_, Outside(), [series = std::move(series)](const std::string& path, ProgressPart progress) {
-    return WriteSeriesFile(path, series, progress);
-  });
+  std::string problem =
+      Write(file_, Outside(), [series = std::move(series)](const std::string& path, ProgressPart progress) {
+        return WriteSeriesFile(path, series, progress);
+      });
+  if (problem.empty() && !notes.empty())
+    Outside().Tell(fmt::format("The file is made. {}", fmt::join(notes, "; ")), Host::Icon::Information);
+  return problem;
 }
 
 }  // namespace tervane

@@ -89,7 +89,7 @@ FileResult ReadSeries(const std::string& path, int number, Series& series, Progr
 
 struct FileKey {
   std::string path;
-  FileStamp stamp;
+  std::vector<FileStamp> stamps;
   int item = 0;           ///< Or the unit of coordinates.
   std::string attribute;  ///< Of a shape file.
   GridSlice slice;
@@ -99,7 +99,7 @@ struct FileKey {
 
 std::shared_ptr<ComputedGrid> RecentGrid(const std::string& path, int item, const GridSlice& slice = {}) {
   static RecentFiles<FileKey, CTvn2DOrthoRotatedGridData> grids;
-  return grids.Get({path, StampOf(path), item, {}, slice}, path,
+  return grids.Get({path, {StampOf(path)}, item, {}, slice}, path,
                    [path, item, slice](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
                      return ReadGridData(path, item, grid, progress, slice);
                    });
@@ -108,7 +108,7 @@ std::shared_ptr<ComputedGrid> RecentGrid(const std::string& path, int item, cons
 std::shared_ptr<Computed<CTvnShapeData>> RecentShapes(const std::string& path, const std::string& attribute,
                                                       int axisUnit) {
   static RecentFiles<FileKey, CTvnShapeData> files;
-  return files.Get({path, StampOf(path), axisUnit, attribute, {}}, path,
+  return files.Get({path, StampsOfShape(path), axisUnit, attribute, {}}, path,
                    [path, attribute, axisUnit](CTvnShapeData& shapes, ProgressPart progress) {
                      shapes.SetAxisLengthUnit(axisUnit);
                      return attribute.empty() ? shapes.ReadShapeFile(path, progress)
@@ -118,7 +118,7 @@ std::shared_ptr<Computed<CTvnShapeData>> RecentShapes(const std::string& path, c
 
 std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item) {
   static RecentFiles<FileKey, Series> files;
-  return files.Get({path, StampOf(path), item, {}, {}}, path, [path, item](Series& series, ProgressPart progress) {
+  return files.Get({path, {StampOf(path)}, item, {}, {}}, path, [path, item](Series& series, ProgressPart progress) {
     return ReadSeries(path, item, series, progress);
   });
 }

@@ -61,5 +61,24 @@ TEST(DataFileRequest, TellsInWordsWhatIsNotMet) {
   EXPECT_THAT(WhyNotMet(folder.File("b.nds0"), {}, {}), testing::HasSubstr("it does not exist"));
 }
 
+TEST(DataFileRequest, WhatNoQuantityOrGridCanBeMadeOfIsRefused) {
+  DataFileFacts file;
+  DataItem item;
+  item.itemType = 100180;
+  item.dimensions = 2;
+  item.geometry.nx = item.geometry.ny = 3;
+  item.unitText = "kg";
+  item.scale = UnitScale{Dimension::Mass};
+  file.items = {item};
+  EXPECT_EQ(WhyNotMet(file, {}, {{100180}, 2, {}, {}}), "item 1 is in \"kg\", which is no unit of Elevation");
+  EXPECT_EQ(WhyNotMet(file, {}, {{}, 2, {}, {}}), "");
+  file.items[0].scale = UnitScale{Dimension::Length};
+  file.items[0].geometry.cellSize = 100;
+  file.items[0].geometry.cellHeight = 200;
+  EXPECT_THAT(WhyNotMet(file, {}, {{100180}, 2, {}, {}}), testing::HasSubstr("cells of 100 x 200, square ones"));
+  file.items[0].geometry.cellHeight = 100.00001;
+  EXPECT_EQ(WhyNotMet(file, {}, {{100180}, 2, {}, {}}), "");
+}
+
 }  // namespace
 }  // namespace tervane

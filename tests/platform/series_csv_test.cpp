@@ -27,6 +27,22 @@ TEST(SeriesCsv, TablesOfAllFormsAreRead) {
   }
 }
 
+TEST(SeriesCsv, RowsArePastedWithOrWithoutNames) {
+  const char* const texts[] = {
+      "2000-02-29\t1.5\n2000-03-01 06:30\t-2e3\n", "day;rain\n2000/02/29;1,5\n2000/03/01 06:30;-2000\n",
+      "2000/02/29 1.5\r\n2000/03/01 06:30   -2000", "\nDate Value\n2000-02-29 1,5\n\n2000-03-01T06:30 -2000\n",
+      "2000-02-29,1.5\n2000-03-01 06:30:00,-2000\n"};
+  for (const char* text : texts) {
+    const CsvSeries series = ReadPastedSeries(text);
+    EXPECT_EQ(series.error, "") << text;
+    EXPECT_THAT(series.values, ElementsAre(1.5f, -2000.0f)) << text;
+    EXPECT_THAT(series.stamps, ElementsAre(CYbDateTime(2000, 2, 29), CYbDateTime(2000, 3, 1, 6, 30))) << text;
+  }
+  EXPECT_THAT(ReadPastedSeries("2000-01-01 1\n2000-02-30 2\n").error, HasSubstr("line 2: \"2000-02-30\" is no date"));
+  EXPECT_THAT(ReadPastedSeries("2000-01-01\t1\n2000-01-01\t2\n").error, HasSubstr("stands already in line 1"));
+  EXPECT_THAT(ReadPastedSeries("2000-01-01\t1\t2\n").error, HasSubstr("name the column to read"));
+}
+
 TEST(SeriesCsv, GapsAndMissingValuesAreToldWithTheirLines) {
   std::string text = "t,v\n";
   for (int day = 1; day <= 28; ++day)

@@ -193,6 +193,33 @@ TEST(Shapes, AreCheckedAgainstARequest) {
   }
 }
 
+TEST(Shapes, TellWhatTheyAreWithoutBeingKept) {
+  const test::TempFolder folder;
+  const std::string path = Save(folder, Zones());
+  const auto facts = ShapeFactsOf(path);
+  EXPECT_EQ(facts->error, "");
+  EXPECT_EQ(facts->fields, kColumns);
+  EXPECT_EQ(facts->shapes, 3u);
+  EXPECT_EQ(facts->withoutPoints, 1u);
+  EXPECT_EQ(facts->extent, (Envelope{0, 0, 30, 10}));
+  EXPECT_EQ(facts->projection, "EPSG:32632");
+  // A table of other shapes, or none, is told apart from the shapes themselves.
+  folder.Write("zones.dbf", test::ReadFile(folder.File("zones.dbf")).replace(4, 1, "\x02"));
+  EXPECT_THAT(ShapeFactsOf(path)->tableProblem, HasSubstr("3 shapes, but"));
+  EXPECT_EQ(CheckShapeFile(path, {}, "").error, "");
+  EXPECT_THAT(CheckShapeFile(path, {false, false, true, Kind::Whole}, "CODE").error, HasSubstr("3 shapes, but"));
+  std::filesystem::remove(folder.File("zones.dbf"));
+  EXPECT_THAT(ShapeFactsOf(path)->tableProblem, HasSubstr("zones.dbf does not exist"));
+
+  CTvnShapeData bow;
+  bow.Create(ShapeKind::Polygon, {}, "");
+  bow.AddShape({{{0, 0}, {4, 4}, {4, 0}, {0, 4}, {0, 0}}, {}, {}, {0}, {}});
+  const FileResult checked = CheckShapeFile(Save(folder, bow), {}, "");
+  EXPECT_EQ(checked.error, "");
+  EXPECT_THAT(checked.note, HasSubstr("ring 1 crosses itself near 2, 2"));
+  EXPECT_THAT(CheckShapeFile(Save(folder, CTvnShapeData()), {}, "").error, HasSubstr("holds no shape with points"));
+}
+
 TEST(Shapes, ThatCannotBeStoredAreNot) {
   const struct {
     Shape shape;

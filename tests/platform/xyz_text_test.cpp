@@ -18,6 +18,8 @@ TEST(XyzText, ReadsEverySeparatorHeadingAndComment) {
            "id x y\n\n# points\n\t1.5\t2\t-300\n! more\n4\t5\t6\tname 7",
            "X;Y;Z\n1,5;2;-300\n4;5;+6\n",
            "1.5 2 -300\r4 5 6\r",
+           "1,5 2,0 -300,0\n4 5 6\n",
+           "1.5, 2, -300\n4, 5, 6\n",
        }) {
     std::vector<ScatteredPoint> points{{9, 9, 9}};
     EXPECT_EQ(ParseXyz(text, "p.txt", points).error, "") << text;

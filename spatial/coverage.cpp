@@ -1,0 +1,680 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "spatial/coverage.h"
+
+#include <algorithm>
+#include <cmath>
+#include <map>
+#include <new>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include "platform/datafile_facts.h"
+#include "platform/datafile_request.h"
+#include "platform/grid_files.h"
+#include "platform/grid_polygons.h"
+#include "platform/shapes.h"
+#include "platform/text.h"
+#include "simspec/periods.h"
+#include "spatial/data2d.h"
+#include "spatial/domain.h"
+#include "spatial/placement.h"
+#include "spatial/zone_sync.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr double kNone = std::numeric_limits<double>::quiet_NaN();
+constexpr std::size_t kMostYears = 500;
+
+using GridData = CTvn2DOrthoRotatedGridData;
+
+CYbDateTime DateAt(std::int64_t seconds) { return CYbDateTime::FromSecondsSinceEpoch(seconds); }
+
+// ---- Asking
+
+/// What a node is called for people: the title of the nearest page above, with the station's name.
+std::string TitleOf(const CYbSEKvfBase& node) {
+  const CYbSEKvfBase* shown = &node;
+  while (shown && !shown->GetDlgRuntimeClass(kSetupDataTree)) shown = shown->GetParent();
+  if (!shown) return node.GetTitle();
+  const std::string& name = shown->GetAbbreviatedTitle();
+  const bool isOneOfMany = dynamic_cast<const CFMSEKvfGroupBase*>(shown) != nullptr;
+  return isOneOfMany && !name.empty() ? fmt::format("{}: {}", shown->GetTitle(), name) : shown->GetTitle();
+}
+
+DomainSource DomainOf(const CYbSEKvfBase& root) {
+  DomainSource source;
+  const auto* domain = root.Important<CCatchmentKvf>("CATCHMENT");
+  if (!domain) return source;
+  source.isShape = domain->Type == CCatchmentKvf::kShapeFile;
+  const FileName& file = source.isShape ? domain->ShapeFile().File : domain->GridFile().File;
+  source.file = file.IsEmpty() ? std::string() : file.Absolute();
+  source.stamps = StampsOfShape(source.file);
+  source.item = domain->GridFile().SelectedItem();
+  source.axisUnit = domain->ShapeAxisUnit;
+  source.geometry = DomainGeometryOf(root);
+  return source;
+}
+
+std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
+  const auto* period = root.Important<CSimPeriodKvf>("SIMPERIOD");
+  if (!period) return std::nullopt;
+  const CYbDateTime start = period->GetSimStartDate(), end = period->SIMEND;
+  if (!start.IsValid() || !end.IsValid() || end <= start) return std::nullopt;
+  return TimeSpan{start.SecondsSinceEpoch(), end.SecondsSinceEpoch()};
+}
+
+CoverageFile AskFile(const NodePlace& place, FileUse use) {
+  CoverageFile file;
+  file.path = place.path;
+  file.serial = place.node.Serial();
+  file.title = TitleOf(place.node);
+  file.findings = place.node.Findings();
+  // What the owner makes of the file, or its grid as it is.
+  if (auto* owner = dynamic_cast<CellValues*>(place.node.GetParent()); owner && use.isOverArea) {
+    file.values = owner->CurrentSource();
+    file.grid = owner->GridComputation();
+  } else if (use.isOverArea && use.kind == FileUse::Kind::Data) {
+    GridSource& source = file.values.emplace();
+    source.type = CData2DKvf::kGridFile;
+    source.file = use.path;
+    source.stamps = use.stamps;
+    source.item = use.item;
+  }
+  file.use = std::move(use);
+  return file;
+}
+
+}  // namespace
+
+CoverageRequest AskCoverage(CYbSEKvfBase& root) {
+  CoverageRequest request;
+  request.simulation = SimulationOf(root);
+  request.domain = DomainOf(root);
+  WalkNodes(root, [&](const NodePlace& place) {
+    if (!place.takesPart) return;
+    if (const auto* user = dynamic_cast<const FileUser*>(&place.node))
+      if (std::optional<FileUse> use = user->UsedFile()) request.files.push_back(AskFile(place, *std::move(use)));
+    if (const auto* forcing = dynamic_cast<const ForcingNode*>(&place.node))
+      request.forcings.push_back({place.path, place.node.Serial(), forcing->CurrentForcing()});
+  });
+  return request;
+}
+
+// ---- Computing
+
+namespace {
+
+/// For each cell of the domain the place of the cell of another grid in which its centre lies; -1 off that grid.
+std::vector<std::ptrdiff_t> PlacesOf(const GridData& domain, const GridGeometry& grid) {
+  const GridTransform own(grid);
+  const GridGeometry& cells = domain.Geometry();
+  std::vector<std::ptrdiff_t> places;
+  for (int j = 0; j < cells.ny; ++j) {
+    for (int i = 0; i < cells.nx; ++i) {
+      if (domain.IsEmptyValue(domain.Value(i, j))) continue;
+      const MapPoint at = own.ToCells(domain.CellCentre(i, j));
+      const bool isInside = at.x >= 0 && at.y >= 0 && at.x < grid.nx && at.y < grid.ny;
+      places.push_back(isInside ? static_cast<std::ptrdiff_t>(at.y) * grid.nx + static_cast<std::ptrdiff_t>(at.x) : -1);
+    }
+  }
+  return places;
+}
+
+/// The values of a grid in the cells of the domain; nothing where there is none.
+std::vector<std::optional<float>> ValuesIn(const GridData& domain, const GridData& grid) {
+  std::vector<std::optional<float>> values;
+  for (const std::ptrdiff_t place : PlacesOf(domain, grid.Geometry())) {
+    const float value = place < 0 ? grid.DeleteValue() : grid.Values()[static_cast<std::size_t>(place)];
+    values.push_back(grid.IsEmptyValue(value) ? std::nullopt : std::optional(value));
+  }
+  return values;
+}
+
+/// A step of a file of grids, as a mean over the domain.
+class DomainMeans {
+ public:
+  /// `wasMissing` is set for the cells of the domain that have no value in a step.
+  DomainMeans(const DataFile& file, int number, const GridData& domain, const std::optional<TimeSpan>& watched,
+              std::vector<bool>& wasMissing)
+      : file_(file),
+        number_(number),
+        item_(file.Items()[static_cast<std::size_t>(number - 1)]),
+        watched_(watched),
+        wasMissing_(wasMissing) {
+    const FileGeometry& g = item_.geometry;
+    places_ = PlacesOf(domain, {g.nx, g.ny, g.IsPlaced() ? g.cellSize : 1.0, g.x0, g.y0, g.rotation, g.projection});
+    wasMissing_.assign(places_.size(), false);
+    values_.resize(item_.CellsOfLayer());
+  }
+
+  std::string Read(std::size_t step, double& mean) {
+    const ValueSelection selection{number_, step, 1, item_.dimensions == 3 ? std::optional(0) : std::nullopt};
+    if (std::string error = file_.Read(selection, values_, item_.itemType); !error.empty()) return error;
+    const bool isWatched =
+        !watched_ || file_.Time().stamps.empty() ||
+        (file_.Time().stamps[step] > watched_->start && (step == 0 || file_.Time().stamps[step - 1] < watched_->end));
+    double sum = 0;
+    std::size_t count = 0;
+    for (std::size_t i = 0; i < places_.size(); ++i) {
+      const float value = places_[i] < 0 ? kDeleteValue : values_[static_cast<std::size_t>(places_[i])];
+      if (value == kDeleteValue) {
+        if (isWatched) wasMissing_[i] = true;
+        continue;
+      }
+      sum += static_cast<double>(value);
+      ++count;
+    }
+    mean = count > 0 ? sum / static_cast<double>(count) : kNone;
+    return {};
+  }
+
+ private:
+  const DataFile& file_;
+  const int number_;
+  const DataItem& item_;
+  std::optional<TimeSpan> watched_;
+  std::vector<bool>& wasMissing_;
+  std::vector<std::ptrdiff_t> places_;  ///< Of each cell of the domain in the file's grid; -1 off it.
+  std::vector<float> values_;
+};
+
+/// Codes of the areas of stations or zones, over the cells of the domain.
+struct AreaCells {
+  std::map<std::string, std::size_t> cellsOfId;
+  std::size_t withoutId = 0;
+  std::string problem;
+};
+
+class BoardMaker {
+ public:
+  BoardMaker(const CoverageRequest& request, const CoverageBoard* previous, ProgressPart progress)
+      : previous_(previous), progress_(progress) {
+    board_.request = request;
+  }
+
+  CoverageBoard Make() {
+    MakePeriods();
+    part_ = progress_.Part(0, 1.0 / static_cast<double>(board_.request.files.size() + 2));
+    MakeDomain();
+    const auto parts = static_cast<double>(board_.request.files.size() + board_.request.forcings.size() + 1);
+    double done = 1;
+    for (const CoverageFile& file : board_.request.files) {
+      part_ = progress_.Part(done / parts, (done + 1) / parts);
+      board_.rows.push_back(MakeRow(file));
+      ++done;
+    }
+    for (const CoverageForcing& forcing : board_.request.forcings) {
+      part_ = progress_.Part(done / parts, (done + 1) / parts);
+      const ForcingTotals* same = nullptr;
+      if (IsOfSameSetting())
+        for (const ForcingTotals& each : previous_->forcings)
+          if (each.forcing.path == forcing.path && each.forcing.forcing == forcing.forcing) same = &each;
+      board_.forcings.push_back(same ? *same : MakeForcing(forcing));
+      board_.forcings.back().forcing = forcing;
+      ++done;
+    }
+    LeaveIfCancelled();
+    progress_.Tell(1);
+    return std::move(board_);
+  }
+
+ private:
+  void LeaveIfCancelled() const { progress_.ThrowIfCancelled(); }
+  bool IsOfSameSetting() const {
+    return previous_ && previous_->request.simulation == board_.request.simulation &&
+           previous_->request.domain == board_.request.domain;
+  }
+
+  void MakePeriods();
+  void MakeDomain();
+
+  CoverageRow MakeRow(const CoverageFile& file);
+  void ReadData(CoverageRow& row);
+  void ReadShape(CoverageRow& row);
+  void ReadPoints(CoverageRow& row);
+  void LookForCells(CoverageRow& row);
+  void TakeMissing(CoverageRow& row, const std::vector<bool>& isMissing);
+  void Conclude(CoverageRow& row);
+
+  ForcingTotals MakeForcing(const CoverageForcing& forcing);
+  void AddDomainColumn(ForcingTotals& totals);
+  AreaCells CellsOf(const GridSource& areas);
+
+  std::vector<TimeSpan> Spans() const {
+    std::vector<TimeSpan> spans;
+    for (const TotalsPeriod& period : board_.periods) spans.push_back(period.span);
+    return spans;
+  }
+  /// An item over time is read once for its row and its forcing.
+  const SeriesFacts& FactsOfSeries(const std::string& path, int item);
+  struct GridSeries {
+    SeriesFacts facts;
+    std::vector<bool> wasMissing;
+  };
+  const GridSeries& FactsOfGrids(const std::string& path, int item);
+
+  const CoverageBoard* previous_;
+  ProgressPart progress_, part_;
+  CoverageBoard board_;
+  std::map<std::pair<std::string, int>, SeriesFacts> series_;
+  std::map<std::pair<std::string, int>, GridSeries> grids_;
+};
+
+void BoardMaker::MakePeriods() {
+  const std::optional<TimeSpan>& simulation = board_.request.simulation;
+  if (!simulation) return;
+  const int first = DateAt(simulation->start).Year(), last = DateAt(simulation->end - 1).Year();
+  for (int year = first; year <= last && board_.periods.size() < kMostYears; ++year) {
+    const CYbDateTime begin(year, 1, 1), end(year + 1, 1, 1);
+    if (!end.IsValid()) break;
+    board_.periods.push_back({std::to_string(year), {begin.SecondsSinceEpoch(), end.SecondsSinceEpoch()}});
+  }
+  board_.periods.push_back({"simulation", *simulation});
+}
+
+void BoardMaker::MakeDomain() {
+  if (IsOfSameSetting()) {
+    board_.domain = previous_->domain;
+    board_.domainProblem = previous_->domainProblem;
+    board_.domainCells = previous_->domainCells;
+    return;
+  }
+  const DomainSource& source = board_.request.domain;
+  if (source.file.empty() || !source.geometry) {
+    board_.domainProblem = source.file.empty() ? "no file is chosen" : DataFileFactsOf(source.file)->error;
+    return;
+  }
+  auto grid = std::make_shared<GridData>();
+  const FileResult result =
+      source.isShape ? grid->MakeCatchmentGriddataFromShapefile(source.file, source.axisUnit, *source.geometry, part_)
+                     : ReadGridData(source.file, source.item, *grid, part_);
+  LeaveIfCancelled();
+  board_.domainProblem = result.error;
+  if (!result.Ok()) return;
+  for (const float value : grid->Values()) board_.domainCells += !grid->IsEmptyValue(value);
+  if (board_.domainCells == 0) board_.domainProblem = "no cell lies inside";
+  board_.domain = std::move(grid);
+}
+
+// ---- Files
+
+CoverageRow BoardMaker::MakeRow(const CoverageFile& file) {
+  LeaveIfCancelled();
+  CoverageRow row;
+  if (IsOfSameSetting()) {
+    const auto same = std::ranges::find_if(previous_->rows, [&](const CoverageRow& each) {
+      return each.file.path == file.path && each.file.use == file.use && each.file.values == file.values;
+    });
+    if (same != previous_->rows.end()) row = *same;
+    row.remarks.clear();
+  }
+  const bool isAtHand = !row.file.path.empty();
+  row.file = file;
+  if (!isAtHand) {
+    if (file.use.path.empty()) {
+      row.problem = "no file is chosen";
+    } else {
+      try {
+        if (file.use.kind == FileUse::Kind::Data) ReadData(row);
+        if (file.use.kind == FileUse::Kind::Shape) ReadShape(row);
+        if (file.use.kind == FileUse::Kind::Points) ReadPoints(row);
+        const FilePlace place = PlaceOf(file.use);
+        row.extent = place.extent;
+        row.isInDegrees = place.isGeographical;
+        if (row.problem.empty() && !row.isInDegrees) LookForCells(row);
+      } catch (const std::bad_alloc&) {
+        row.problem = "it needs more than the free memory";
+      }
+    }
+  }
+  Conclude(row);
+  part_.Tell(1);
+  return row;
+}
+
+void BoardMaker::ReadData(CoverageRow& row) {
+  const FileUse& use = row.file.use;
+  const auto facts = DataFileFactsOf(use.path);
+  row.problem = facts->error.empty() ? facts->WhyNoItem(use.item) : facts->error;
+  if (!row.problem.empty()) return;
+  const DataItem& item = *facts->Item(use.item);
+  const Unit* unit = FindUnit(item.unitKey);
+  const std::string_view unitText = unit && !unit->abbreviation.empty() ? unit->abbreviation : item.unitText;
+  row.item = unitText.empty() ? item.name : fmt::format("{} [{}]", item.name, unitText);
+  if (item.hasTime && use.isOverTime && facts->time.stamps.empty())
+    row.problem = facts->time.steps == 0 ? "the file has no time steps" : "the file has no dates";
+  if (!item.hasTime || facts->time.stamps.empty()) return;
+  row.steps = facts->time.stamps.size();
+  row.period = TimeSpan{StartOfValues(item, facts->time).SecondsSinceEpoch(), facts->time.stamps.back()};
+  const std::optional<TimeSpan>& simulation = board_.request.simulation;
+  if (!use.isOverTime || !simulation) return;
+  row.late = std::clamp(row.period->start - simulation->start, std::int64_t{0}, simulation->Seconds());
+  row.early = std::clamp(simulation->end - row.period->end, std::int64_t{0}, simulation->Seconds());
+  if (item.dimensions != 0) return;
+  const SeriesFacts& series = FactsOfSeries(use.path, use.item);
+  row.problem = series.error;
+  row.gaps = series.gaps;
+}
+
+void BoardMaker::ReadShape(CoverageRow& row) {
+  const auto facts = ShapeFactsOf(row.file.use.path);
+  row.problem = facts->error;
+  if (!row.problem.empty()) return;
+  row.item = row.file.use.attribute;
+}
+
+void BoardMaker::ReadPoints(CoverageRow& row) {
+  const auto facts = XyzFactsOf(row.file.use.path);
+  row.problem = facts->error;
+  if (!row.problem.empty()) return;
+  row.item = facts->points == 1 ? "1 point" : fmt::format("{} points", facts->points);
+}
+
+void BoardMaker::LookForCells(CoverageRow& row) {
+  if (!row.file.values || !board_.domain || board_.domainCells == 0) return;
+  const GridSource& source = *row.file.values;
+  const auto facts = source.type == CData2DKvf::kGridFile ? DataFileFactsOf(source.file) : nullptr;
+  const DataItem* item = facts ? facts->Item(source.item) : nullptr;
+  std::vector<bool> isMissing;
+  if (item && item->hasTime && row.file.use.isOverTime && !facts->time.stamps.empty()) {
+    const GridSeries& grids = FactsOfGrids(source.file, source.item);
+    row.problem = grids.facts.error;
+    row.gaps = grids.facts.gaps;
+    isMissing = grids.wasMissing;
+  } else {
+    std::shared_ptr<ComputedGrid> made = row.file.grid;
+    if (!made)
+      made = std::make_shared<ComputedGrid>(
+          std::string(), [source](GridData& grid, ProgressPart progress) { return BuildGrid(source, progress, grid); });
+    made->Run(part_);
+    LeaveIfCancelled();
+    row.problem = made->Problem();
+    if (made->Result()) {
+      for (const std::optional<float>& value : ValuesIn(*board_.domain, *made->Result())) isMissing.push_back(!value);
+    }
+  }
+  if (row.problem.empty()) TakeMissing(row, isMissing);
+}
+
+void BoardMaker::TakeMissing(CoverageRow& row, const std::vector<bool>& isMissing) {
+  row.cells = board_.domainCells;
+  row.missing = static_cast<std::size_t>(std::ranges::count(isMissing, true));
+  if (row.missing == 0) return;
+  std::vector<float> marks(board_.domain->Values().size(), kUsualDeleteValue);
+  std::size_t cell = 0;
+  for (std::size_t i = 0; i < marks.size(); ++i)
+    if (!board_.domain->IsEmptyValue(board_.domain->Values()[i])) marks[i] = isMissing[cell++] ? 2.0F : 1.0F;
+  auto grid = std::make_shared<GridData>();
+  if (grid->TakeValues(board_.domain->Geometry(), std::move(marks), kUsualDeleteValue, kWholeNumberUnit, kCodeItemType)
+          .empty())
+    row.missingCells = std::move(grid);
+}
+
+void BoardMaker::Conclude(CoverageRow& row) {
+  const auto add = [&](Severity severity, std::string text) {
+    row.remarks.push_back({severity, std::move(text), {}, {}});
+  };
+  row.remarks = row.file.findings;
+  const bool isTold =
+      std::ranges::any_of(row.remarks, [](const Finding& finding) { return finding.severity == Severity::Error; });
+  if (!row.problem.empty() && !isTold) add(Severity::Error, row.problem);
+  // Nodes of points have no validation.
+  if (row.problem.empty() && row.file.use.kind == FileUse::Kind::Points && board_.request.domain.geometry)
+    std::ranges::move(FindMisplacement(PlaceOf(row.file.use), *board_.request.domain.geometry),
+                      std::back_inserter(row.remarks));
+  constexpr std::size_t kMostGaps = 5;
+  for (std::size_t i = 0; i < std::min(row.gaps.size(), kMostGaps); ++i)
+    add(Severity::Warning, fmt::format("No values from {} to {}", DateInWords(DateAt(row.gaps[i].start)),
+                                       DateInWords(DateAt(row.gaps[i].end))));
+  if (row.gaps.size() > kMostGaps) add(Severity::Warning, fmt::format("And {} gaps more", row.gaps.size() - kMostGaps));
+  if (row.missing > 0) add(Severity::Warning, MissingCellsText(row));
+  std::ranges::stable_sort(row.remarks, {}, &Finding::severity);
+  row.state = CoverageState::Fine;
+  if (row.remarks.empty()) return;
+  const Severity worst = row.remarks.front().severity;
+  row.state = worst == Severity::Error     ? CoverageState::Error
+              : worst == Severity::Warning ? CoverageState::Warning
+                                           : CoverageState::Note;
+}
+
+// ---- Over time
+
+const SeriesFacts& BoardMaker::FactsOfSeries(const std::string& path, int item) {
+  const auto [found, isNew] = series_.try_emplace({path, item});
+  if (isNew) found->second = SumSeries(path, item, Spans(), board_.request.simulation, part_);
+  LeaveIfCancelled();
+  return found->second;
+}
+
+const BoardMaker::GridSeries& BoardMaker::FactsOfGrids(const std::string& path, int number) {
+  const auto [found, isNew] = grids_.try_emplace({path, number});
+  GridSeries& grids = found->second;
+  if (!isNew) return grids;
+  DataFile file;
+  SeriesFacts& facts = grids.facts;
+  if (facts.error = file.Open(path); !facts.error.empty()) return grids;
+  if (number < 1 || static_cast<std::size_t>(number) > file.Items().size() || !board_.domain) {
+    facts.error = board_.domain ? fmt::format("{}: there is no item {}", path, number) : "there is no domain";
+    return grids;
+  }
+  const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)];
+  if (item.dimensions < 2 || !item.hasTime || file.Time().stamps.empty()) {
+    facts.error = fmt::format("{}: item {} holds no grids with dates", path, number);
+    return grids;
+  }
+  DomainMeans means(file, number, *board_.domain, board_.request.simulation, grids.wasMissing);
+  facts = SumSteps(
+      item, file.Time(), Spans(), board_.request.simulation,
+      [&](std::size_t step, double& value) { return means.Read(step, value); }, part_);
+  LeaveIfCancelled();
+  return grids;
+}
+
+// ---- Forcings
+
+/// What a constant comes to.
+std::vector<PeriodSum> SumsOfConstant(double value, const std::vector<TimeSpan>& periods) {
+  std::vector<PeriodSum> sums;
+  for (const TimeSpan& period : periods)
+    sums.push_back({value * static_cast<double>(period.Seconds()), period.Seconds()});
+  return sums;
+}
+
+ForcingTotals BoardMaker::MakeForcing(const CoverageForcing& asked) {
+  LeaveIfCancelled();
+  ForcingTotals totals;
+  totals.forcing = asked;
+  const Forcing& forcing = asked.forcing;
+  int itemType = forcing.itemType;
+  ValueType valueType = ValueType::MeanStep;
+  const auto takeKind = [&](const std::string& path, int number) {
+    const auto facts = DataFileFactsOf(path);
+    if (const DataItem* item = facts->Item(number)) {
+      itemType = item->itemType;
+      valueType = item->valueType;
+    }
+  };
+  if (forcing.overGrid) {
+    takeKind(forcing.overGrid->path, forcing.overGrid->item);
+    const GridSeries& grids = FactsOfGrids(forcing.overGrid->path, forcing.overGrid->item);
+    totals.columns.push_back({"domain", 1.0, grids.facts.sums, grids.facts.error});
+  }
+  for (const ForcingSeries& series : forcing.series) {
+    ForcingTotals::Column column;
+    column.name = series.name.empty() ? "all" : series.name;
+    if (series.constant) {
+      column.sums = SumsOfConstant(*series.constant, Spans());
+    } else {
+      takeKind(series.path, series.item);
+      const SeriesFacts& facts = FactsOfSeries(series.path, series.item);
+      column.sums = facts.sums;
+      column.problem = series.path.empty() ? "no file is chosen" : facts.error;
+    }
+    totals.columns.push_back(std::move(column));
+  }
+  totals.form = TotalFormOf(itemType, valueType);
+  if (forcing.areas) AddDomainColumn(totals);
+  part_.Tell(1);
+  return totals;
+}
+
+void BoardMaker::AddDomainColumn(ForcingTotals& totals) {
+  if (!board_.domain || board_.domainCells == 0) return;
+  AreaCells areas = CellsOf(*totals.forcing.forcing.areas);
+  if (!areas.problem.empty()) {
+    totals.remarks.push_back(areas.problem);
+    return;
+  }
+  ForcingTotals::Column mean;
+  mean.name = "domain";
+  mean.share = 0;
+  mean.sums.resize(board_.periods.size());
+  std::vector<double> weights(board_.periods.size(), 0);
+  for (std::size_t i = 0; i < totals.columns.size(); ++i) {
+    ForcingTotals::Column& column = totals.columns[i];
+    const auto found = areas.cellsOfId.find(totals.forcing.forcing.series[i].id);
+    const std::size_t cells = found == areas.cellsOfId.end() ? 0 : found->second;
+    if (found != areas.cellsOfId.end()) areas.cellsOfId.erase(found);
+    column.share = static_cast<double>(cells) / static_cast<double>(board_.domainCells);
+    *mean.share += *column.share;
+    if (cells == 0) {
+      totals.remarks.push_back(fmt::format("Station {} has no cell in the domain", column.name));
+      continue;
+    }
+    for (std::size_t p = 0; p < mean.sums.size() && p < column.sums.size(); ++p) {
+      if (column.sums[p].covered == 0) continue;
+      // The mean of the time that a station has values for stands for its area.
+      const double rate = column.sums[p].integral / static_cast<double>(column.sums[p].covered);
+      mean.sums[p].integral += *column.share * rate;
+      weights[p] += *column.share;
+      mean.sums[p].covered = std::max(mean.sums[p].covered, column.sums[p].covered);
+    }
+  }
+  for (std::size_t p = 0; p < mean.sums.size(); ++p)
+    if (weights[p] > 0) mean.sums[p].integral *= static_cast<double>(mean.sums[p].covered) / weights[p];
+  std::vector<std::string> withoutStation;
+  std::size_t cells = areas.withoutId;
+  for (const auto& [id, count] : areas.cellsOfId) {
+    withoutStation.push_back(id);
+    cells += count;
+  }
+  if (cells > 0)
+    totals.remarks.push_back(withoutStation.empty()
+                                 ? fmt::format("{} cells of the domain belong to no station", cells)
+                                 : fmt::format("{} cells of the domain belong to no station: those of {}", cells,
+                                               fmt::join(withoutStation, ", ")));
+  totals.columns.push_back(std::move(mean));
+}
+
+AreaCells BoardMaker::CellsOf(const GridSource& source) {
+  AreaCells cells;
+  GridData grid;
+  ZoneTable zones;
+  FileResult result;
+  const bool isPolygons = source.type == CData2DKvf::kShapeFile;
+  if (isPolygons) {
+    const PolygonFile polygons{source.file, source.attribute, source.gapFill, source.axisUnit};
+    result = grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, part_);
+  } else {
+    result = ReadGridData(source.file, source.item, grid, part_);
+  }
+  LeaveIfCancelled();
+  cells.problem = result.error;
+  if (!result.Ok()) return cells;
+  std::map<int, std::string> idOfCode;
+  for (const ZoneTable::Zone& zone : zones.zones) idOfCode[zone.code] = zone.text;
+  for (const std::optional<float>& value : ValuesIn(*board_.domain, grid)) {
+    if (!value) {
+      ++cells.withoutId;
+      continue;
+    }
+    const int code = static_cast<int>(std::lround(*value));
+    ++cells.cellsOfId[isPolygons ? idOfCode[code] : std::to_string(code)];
+  }
+  return cells;
+}
+
+}  // namespace
+
+FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous, CoverageBoard& board,
+                           ProgressPart progress) {
+  try {
+    board = BoardMaker(request, previous, progress).Make();
+  } catch (const Cancelled&) {
+    return {kCancelled, {}};
+  }
+  return {};
+}
+
+// ---- In words
+
+std::string_view NameOf(CoverageState state) {
+  constexpr std::string_view kNames[] = {"ok", "note", "warning", "error"};
+  return kNames[static_cast<std::size_t>(state)];
+}
+
+std::string TimeLengthText(std::int64_t seconds) {
+  constexpr std::int64_t kHour = 3600, kDay = 86400;
+  const auto text = [&](std::int64_t unit, const char* name) {
+    const double count = std::round(static_cast<double>(seconds) / static_cast<double>(unit) * 10) / 10;
+    return fmt::format("{} {}{}", ShortestNumber(count), name, count == 1 ? "" : "s");
+  };
+  return seconds >= kDay ? text(kDay, "day") : seconds >= kHour ? text(kHour, "hour") : text(60, "minute");
+}
+
+std::string ForcingTotals::Heading() const {
+  return fmt::format("{}, {} [{}]", forcing.forcing.title, form.isTotal ? "total" : "mean", form.unit);
+}
+
+std::string ForcingTotals::ColumnText(std::size_t column) const {
+  const Column& c = columns[column];
+  return c.share ? fmt::format("{} ({:.0f}%)", c.name, *c.share * 100) : c.name;
+}
+
+std::string ForcingTotals::ValueText(std::size_t column, std::size_t period, const TimeSpan& span) const {
+  const Column& c = columns[column];
+  if (period >= c.sums.size() || c.sums[period].covered == 0) return {};
+  std::string text = FormatNumber(form.Of(c.sums[period]), "%.5g");
+  const double share = static_cast<double>(c.sums[period].covered) / static_cast<double>(span.Seconds());
+  if (share < 1) text += fmt::format(" ({:.{}f}%)", share * 100, share > 0.995 ? 2 : 0);
+  return text;
+}
+
+std::string MissingCellsText(const CoverageRow& row) {
+  if (row.missing == 0) return {};
+  return fmt::format("{} of the domain {} no {}", row.missing == 1 ? "1 cell" : fmt::format("{} cells", row.missing),
+                     row.missing == 1 ? "has" : "have", LowerCase(row.file.title));
+}
+
+std::string CoverageRow::PeriodText() const {
+  if (period) return fmt::format("{} to {}", DateInWords(DateAt(period->start)), DateInWords(DateAt(period->end)));
+  return file.use.isOverTime && problem.empty() ? "at all times" : "";
+}
+
+std::string CoverageRow::TimeText() const {
+  if (!file.use.isOverTime || !problem.empty()) return {};
+  std::vector<std::string> parts;
+  if (late > 0) parts.push_back(fmt::format("starts {} late", TimeLengthText(late)));
+  if (early > 0) parts.push_back(fmt::format("ends {} early", TimeLengthText(early)));
+  if (!gaps.empty()) {
+    std::int64_t all = 0;
+    for (const TimeSpan& gap : gaps) all += gap.Seconds();
+    parts.push_back(gaps.size() == 1 ? fmt::format("a gap of {}", TimeLengthText(all))
+                                     : fmt::format("{} gaps, {}", gaps.size(), TimeLengthText(all)));
+  }
+  return parts.empty() ? "covers the simulation" : fmt::format("{}", fmt::join(parts, "; "));
+}
+
+std::string CoverageRow::AreaText() const {
+  if (!file.use.isOverArea || !problem.empty()) return {};
+  if (isInDegrees) return "in degrees";
+  if (cells == 0) return {};
+  if (missing == cells) return "covers no cell of the domain";
+  return missing == 0 ? "covers the domain" : fmt::format("{} of {} cells have no value", missing, cells);
+}
+
+}  // namespace tervane

@@ -1,0 +1,207 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "spatial/coverage.h"
+
+#include <gmock/gmock.h>
+
+#include "core/path.h"
+#include "platform/datafile_writer.h"
+#include "platform/grid_files.h"
+#include "platform/shapes.h"
+#include "simspec/periods.h"
+#include "spatial/data2d.h"
+#include "spatial/domain.h"
+#include "spatial/stations.h"
+#include "tests/support/setup.h"
+#include "tests/support/temp_folder.h"
+
+namespace tervane {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+
+constexpr float kMissing = kDeleteValue;
+
+/// A setup of the years 2000 and 2001 on a domain of 10 by 10 cells of 100 m.
+class Coverage : public testing::Test {
+ protected:
+  Coverage() {
+    auto& period = *document_.Root().Important<CSimPeriodKvf>("SIMPERIOD");
+    period.SIMSTART = CYbDateTime(2000, 7, 1);
+    period.SIMEND = CYbDateTime(2001, 7, 1);
+    auto& domain = *document_.Root().Important<CCatchmentKvf>("CATCHMENT");
+    WritePolygons("domain.shp", {{0, 1000}});
+    domain.Type = CCatchmentKvf::kShapeFile;
+    domain.ShapeFile().Choose(FileName("domain.shp", folder_.Path()), {});
+    domain.nxShp = domain.nyShp = 10;
+    domain.sizeShp = 100;
+    document_.Root().Validate();
+  }
+
+  /// Rectangles over the whole height, from x to x, numbered from 1.
+  void WritePolygons(const std::string& name, const std::vector<std::pair<double, double>>& ranges) {
+    CTvnShapeData shapes;
+    shapes.Create(ShapeKind::Polygon, {{"CODE", AttributeKind::Whole}}, "");
+    std::int64_t code = 0;
+    for (const auto& [from, to] : ranges)
+      shapes.AddShape({{{from, 0}, {from, 1000}, {to, 1000}, {to, 0}, {from, 0}}, {}, {}, {0}, {++code}});
+    ASSERT_EQ(shapes.SaveShapeFile(folder_.File(name)).error, "");
+  }
+  /// Rain in mm/day over each of so many days from a date on; `values` go round.
+  void WriteSeries(const std::string& name, const CYbDateTime& begin, int days, const std::vector<float>& values) {
+    NewDataFile content;
+    content.dimensions = 0;
+    content.items = {{"Rain", 100431, 2004, ValueType::MeanStep}};
+    content.begin = begin;
+    DataFileWriter writer;
+    ASSERT_EQ(writer.Create(folder_.File(name), content), "");
+    for (int day = 0; day < days; ++day) {
+      ASSERT_EQ(writer.AddStep(begin + CYbDateTimeSpan::Days(day + 1)), "");
+      ASSERT_EQ(writer.Put(1, {&values[static_cast<std::size_t>(day) % values.size()], 1}), "");
+    }
+    ASSERT_EQ(writer.Finish().error, "");
+  }
+  C2DStationBasedDataKvf& Rain() {
+    return dynamic_cast<C2DStationBasedDataKvf&>(
+        *FindNode(document_.Root(), ParseSetupPath("Climate/PrecipitationRate").steps));
+  }
+  std::shared_ptr<const CoverageBoard> Board(const CoverageBoard* previous = nullptr) {
+    document_.Root().Validate();
+    auto board = std::make_shared<CoverageBoard>();
+    EXPECT_EQ(ComputeCoverage(AskCoverage(document_.Root()), previous, *board).error, "");
+    return board;
+  }
+  /// The row of a file by its name.
+  static const CoverageRow& RowOf(const CoverageBoard& board, const std::string& file) {
+    for (const CoverageRow& row : board.rows)
+      if (row.file.use.path.ends_with("/" + file)) return row;
+    throw std::runtime_error("no row of " + file);
+  }
+
+  test::TempFolder folder_;
+  CFlowModelDoc document_;
+};
+
+TEST_F(Coverage, CountsTheCellsWithoutAValue) {
+  auto& topography = *document_.Root().Important<CTopographyKvf>("TOPOGRAPHY");
+  topography.Type = CData2DKvf::kGridFile;
+  topography.GridFile().Choose(FileName("dem.nds2", folder_.Path()));
+  // Seven columns, and one empty cell in them.
+  CTvn2DOrthoRotatedGridData dem;
+  ASSERT_EQ(dem.SetGridData({7, 10, 100, 0, 0, 0, {}}, 5, kUsualDeleteValue, 1000, 100180), "");
+  dem.GetData()[3] = kUsualDeleteValue;
+  ASSERT_EQ(WriteGridData(folder_.File("dem.nds2"), dem).error, "");
+  const auto board = Board();
+  EXPECT_EQ(board->domainCells, 100U);
+  const CoverageRow& row = RowOf(*board, "dem.nds2");
+  EXPECT_EQ(row.missing, 31U);
+  EXPECT_EQ(row.state, CoverageState::Warning);
+  EXPECT_EQ(MissingCellsText(row), "31 cells of the domain have no topography");
+  EXPECT_EQ(row.AreaText(), "31 of 100 cells have no value");
+  ASSERT_NE(row.missingCells, nullptr);
+  EXPECT_EQ(row.missingCells->Value(3, 0), 2.0F);
+  EXPECT_EQ(row.missingCells->Value(4, 0), 1.0F);
+
+  // A grid of points reaches as far as its search radius.
+  topography.Type = CData2DKvf::kXyzFile;
+  topography.XyzFile().File = FileName("dem.txt", folder_.Path());
+  folder_.Write("dem.txt", "0 0 5\n");
+  topography.SearchRadius = 80;
+  EXPECT_EQ(RowOf(*Board(), "dem.txt").missing, 99U);
+  topography.SearchRadius = 5000;
+  EXPECT_EQ(RowOf(*Board(), "dem.txt").AreaText(), "covers the domain");
+  // Nodes of points have no validation: the board tells what is wrong with them.
+  folder_.Write("dem.txt", "0 0 5\n1 x 3\n");
+  const auto broken = Board();
+  EXPECT_EQ(RowOf(*broken, "dem.txt").state, CoverageState::Error);
+  EXPECT_THAT(RowOf(*broken, "dem.txt").problem, HasSubstr("dem.txt, line 2: y is \"x\""));
+}
+
+TEST_F(Coverage, HoldsPeriodsAndGapsAgainstTheSimulation) {
+  Rain().DistributionType = C2DStationBasedDataKvf::kUniform;
+  Rain().Global().TYPE = CGlobalKvf::kTimeVarying;
+  Rain().Global().SeriesFile().Choose(FileName("rain.nds0", folder_.Path()));
+  const struct {
+    CYbDateTime begin;
+    int days;
+    std::vector<float> values;
+    const char* text;
+    CoverageState state;
+  } rows[] = {
+      {{2000, 1, 1}, 731, {1}, "covers the simulation", CoverageState::Fine},
+      {{2000, 7, 11}, 400, {1}, "starts 10 days late", CoverageState::Warning},
+      {{2000, 7, 1}, 180, {1}, "ends 185 days early", CoverageState::Warning},
+      {{2000, 7, 1}, 365, {1, 1, 1, 1, kMissing}, "73 gaps, 73 days", CoverageState::Warning},
+      {{1990, 1, 1}, 10, {1}, "ends 365 days early", CoverageState::Warning},
+  };
+  for (const auto& row : rows) {
+    WriteSeries("rain.nds0", row.begin, row.days, row.values);
+    const auto board = Board();
+    EXPECT_EQ(RowOf(*board, "rain.nds0").TimeText(), row.text);
+    EXPECT_EQ(RowOf(*board, "rain.nds0").state, row.state) << row.text;
+  }
+}
+
+TEST_F(Coverage, WeighsStationsByTheirShareOfTheDomain) {
+  C2DStationBasedDataKvf& rain = Rain();
+  WritePolygons("stations.shp", {{0, 300}, {300, 900}});
+  rain.DistributionType = C2DStationBasedDataKvf::kStationBased;
+  rain.Stations().TYPE = CStationBasedKvf::kPolygons;
+  rain.Stations().ShapeFile().Choose(FileName("stations.shp", folder_.Path()), "CODE");
+  ASSERT_EQ(rain.SyncStations(), kAdded);
+  WriteSeries("west.nds0", {2000, 1, 1}, 731, {1});
+  auto& west = dynamic_cast<C2DStationBasedDataTimeSeriesKvf&>(*ZoneItems(rain)[0]);
+  auto& east = dynamic_cast<C2DStationBasedDataTimeSeriesKvf&>(*ZoneItems(rain)[1]);
+  west.SeriesFile().Choose(FileName("west.nds0", folder_.Path()));
+  east.TYPE = C2DStationBasedDataTimeSeriesKvf::kConstant;
+  east.FIXED_VALUE = 4;
+  const auto board = Board();
+  ASSERT_EQ(board->periods.size(), 3U);
+  EXPECT_EQ(board->periods[0].name, "2000");
+  EXPECT_EQ(board->periods[2].name, "simulation");
+  const auto found = std::ranges::find_if(
+      board->forcings, [](const ForcingTotals& each) { return each.forcing.path == "Climate/PrecipitationRate"; });
+  ASSERT_NE(found, board->forcings.end());
+  EXPECT_THAT(found->Heading(), HasSubstr("total [mm]"));
+  ASSERT_EQ(found->columns.size(), 3U);
+  const auto valuesOf = [&](std::size_t column) {
+    std::vector<double> values;
+    for (const PeriodSum& sum : found->columns[column].sums) values.push_back(found->form.Of(sum));
+    return values;
+  };
+  EXPECT_THAT(valuesOf(0), ElementsAre(366, 365, 365));
+  EXPECT_THAT(valuesOf(1), ElementsAre(4 * 366, 4 * 365, 4 * 365));
+  // A third of the area that has a station is the west's.
+  EXPECT_THAT(valuesOf(2),
+              ElementsAre(testing::DoubleEq(3 * 366), testing::DoubleEq(3 * 365), testing::DoubleEq(3 * 365)));
+  EXPECT_DOUBLE_EQ(*found->columns[0].share, 0.3);
+  EXPECT_THAT(found->remarks, ElementsAre("10 cells of the domain belong to no station"));
+  EXPECT_EQ(RowOf(*board, "stations.shp").missing, 10U);
+  // One station fills the gaps between the polygons.
+  rain.Stations().ShapeGapFillName = west.NAME;
+  const auto filled = Board();
+  EXPECT_EQ(RowOf(*filled, "stations.shp").missing, 0U);
+}
+
+TEST_F(Coverage, TakesWhatStayedTheSameFromTheBoardBefore) {
+  WriteSeries("rain.nds0", {2000, 1, 1}, 731, {1});
+  Rain().DistributionType = C2DStationBasedDataKvf::kUniform;
+  Rain().Global().TYPE = CGlobalKvf::kTimeVarying;
+  Rain().Global().SeriesFile().Choose(FileName("rain.nds0", folder_.Path()));
+  const auto first = Board();
+  const auto again = Board(first.get());
+  EXPECT_EQ(again->domain, first->domain);
+  EXPECT_EQ(again->rows.size(), first->rows.size());
+  document_.Root().Important<CSimPeriodKvf>("SIMPERIOD")->SIMEND = CYbDateTime(2003, 1, 1);
+  EXPECT_EQ(RowOf(*Board(again.get()), "rain.nds0").TimeText(), "ends 365 days early");
+
+  Progress progress;
+  progress.Cancel();
+  CoverageBoard cancelled;
+  EXPECT_EQ(ComputeCoverage(AskCoverage(document_.Root()), nullptr, cancelled, progress).error, kCancelled);
+}
+
+}  // namespace
+}  // namespace tervane
