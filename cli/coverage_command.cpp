@@ -71,19 +71,18 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
                  remark.detail.empty() ? "" : fmt::format(" ({})", remark.detail));
   for (const ForcingTotals& totals : board.forcings) {
     fmt::print(out, "\n{}: {}; in brackets shares of domain and time\n", totals.forcing.path, totals.Heading());
-    Rows table{{""}};
-    for (std::size_t column = 0; column < totals.columns.size(); ++column)
-      table.front().push_back(totals.ColumnText(column));
-    for (std::size_t period = 0; period < board.periods.size(); ++period) {
+    Rows table{{"station"}};
+    for (const TotalsPeriod& period : board.periods) table.front().push_back(period.name);
+    for (std::size_t column = 0; column < totals.columns.size(); ++column) {
       auto& row = table.emplace_back();
-      row.push_back(board.periods[period].name);
-      for (std::size_t column = 0; column < totals.columns.size(); ++column)
+      row.push_back(totals.ColumnText(column));
+      for (std::size_t period = 0; period < board.periods.size(); ++period)
         row.push_back(totals.ValueText(column, period, board.periods[period].span));
     }
     WriteTable(table, out);
     for (const ForcingTotals::Column& column : totals.columns)
       if (!column.problem.empty()) fmt::print(out, "error: {}: {}\n", column.name, column.problem);
-    for (const std::string& remark : totals.remarks) fmt::print(out, "warning: {}\n", remark);
+    for (const Finding& remark : totals.remarks) fmt::print(out, "{}: {}\n", NameOf(remark.severity), remark.text);
   }
 }
 
@@ -99,13 +98,16 @@ std::string JsonSpan(const TimeSpan& span) {
 
 std::string Optional(const std::string& text) { return text.empty() ? std::string() : JsonQuoted(text); }
 
+std::string JsonRemark(const Finding& remark) {
+  return JsonObject({{"severity", JsonQuoted(NameOf(remark.severity))},
+                     {"text", JsonQuoted(remark.text)},
+                     {"detail", Optional(remark.detail)}});
+}
+
 std::string JsonRow(const CoverageRow& row) {
   std::vector<std::string> gaps, remarks;
   for (const TimeSpan& gap : row.gaps) gaps.push_back(JsonSpan(gap));
-  for (const Finding& remark : row.remarks)
-    remarks.push_back(JsonObject({{"severity", JsonQuoted(NameOf(remark.severity))},
-                                  {"text", JsonQuoted(remark.text)},
-                                  {"detail", Optional(remark.detail)}}));
+  for (const Finding& remark : row.remarks) remarks.push_back(JsonRemark(remark));
   const auto whenOverTime = [&](const std::string& text) { return row.file.use.isOverTime ? text : std::string(); };
   const auto whenAsked = [&](std::size_t count) { return row.cells > 0 ? std::to_string(count) : std::string(); };
   const auto& box = row.extent;
@@ -145,7 +147,7 @@ std::string JsonTotals(const ForcingTotals& totals, const std::vector<TotalsPeri
                                   {"problem", Optional(column.problem)},
                                   {"values", JsonArray(values)}}));
   }
-  for (const std::string& remark : totals.remarks) remarks.push_back(JsonQuoted(remark));
+  for (const Finding& remark : totals.remarks) remarks.push_back(JsonRemark(remark));
   return JsonObject({{"path", JsonQuoted(totals.forcing.path)},
                      {"title", JsonQuoted(totals.forcing.forcing.title)},
                      {"kind", JsonQuoted(totals.form.isTotal ? "total" : "mean")},
@@ -174,11 +176,12 @@ int CoverageCommand(const std::string& file, bool json, Streams streams) {
   CoverageBoard board;
   ComputeCoverage(AskCoverage(document.Root()), nullptr, board);
   json ? WriteJson(board, streams.out) : WriteText(board, streams.out);
+  const auto isNote = [](const Finding& remark) { return remark.severity == Severity::Note; };
   const bool isCovered =
       board.domain && board.request.simulation &&
       std::ranges::all_of(board.rows, [](const CoverageRow& row) { return row.state <= CoverageState::Note; }) &&
-      std::ranges::all_of(board.forcings, [](const ForcingTotals& totals) {
-        return totals.remarks.empty() &&
+      std::ranges::all_of(board.forcings, [&](const ForcingTotals& totals) {
+        return std::ranges::all_of(totals.remarks, isNote) &&
                std::ranges::all_of(totals.columns, [](const auto& column) { return column.problem.empty(); });
       });
   return isCovered ? kDone : kFindings;

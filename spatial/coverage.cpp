@@ -526,7 +526,7 @@ void BoardMaker::AddDomainColumn(ForcingTotals& totals) {
   if (!board_.domain || board_.domainCells == 0) return;
   AreaCells areas = CellsOf(*totals.forcing.forcing.areas);
   if (!areas.problem.empty()) {
-    totals.remarks.push_back(areas.problem);
+    totals.remarks.push_back({Severity::Error, areas.problem, {}, {}});
     return;
   }
   ForcingTotals::Column mean;
@@ -542,7 +542,8 @@ void BoardMaker::AddDomainColumn(ForcingTotals& totals) {
     column.share = static_cast<double>(cells) / static_cast<double>(board_.domainCells);
     *mean.share += *column.share;
     if (cells == 0) {
-      totals.remarks.push_back(fmt::format("Station {} has no cell in the domain", column.name));
+      totals.remarks.push_back(
+          {Severity::Note, fmt::format("Station {} has no cell in the domain", column.name), {}, {}});
       continue;
     }
     for (std::size_t p = 0; p < mean.sums.size() && p < column.sums.size(); ++p) {
@@ -563,10 +564,11 @@ void BoardMaker::AddDomainColumn(ForcingTotals& totals) {
     cells += count;
   }
   if (cells > 0)
-    totals.remarks.push_back(withoutStation.empty()
-                                 ? fmt::format("{} cells of the domain belong to no station", cells)
-                                 : fmt::format("{} cells of the domain belong to no station: those of {}", cells,
-                                               fmt::join(withoutStation, ", ")));
+    totals.remarks.push_back({Severity::Warning,
+                              fmt::format("{} cells of the domain belong to no station{}{}", cells,
+                                          withoutStation.empty() ? "" : ": those of ", fmt::join(withoutStation, ", ")),
+                              {},
+                              {}});
   totals.columns.push_back(std::move(mean));
 }
 

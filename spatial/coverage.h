@@ -109,7 +109,7 @@ struct ForcingTotals {
     std::string problem;
   };
   std::vector<Column> columns;
-  std::vector<std::string> remarks;
+  std::vector<Finding> remarks;
 
   /// "Precipitation Rate, total [mm]".
   std::string Heading() const;

@@ -74,7 +74,7 @@ std::string TextOf(const CoverageRow& row) {
 
 std::string TextOf(const ForcingTotals& totals) {
   std::string text = totals.Heading();
-  for (const std::string& remark : totals.remarks) text += "\nwarning: " + remark;
+  for (const Finding& remark : totals.remarks) text += fmt::format("\n{}: {}", NameOf(remark.severity), remark.text);
   for (const ForcingTotals::Column& column : totals.columns)
     if (!column.problem.empty()) text += fmt::format("\nerror: {}: {}", column.name, column.problem);
   return text;

@@ -4,6 +4,7 @@
 #include <sstream>
 
 #include <gmock/gmock.h>
+#include <rapidjson/document.h>
 
 #include "cli/command_line.h"
 #include "document/flow_model_document.h"
@@ -70,6 +71,58 @@ TEST(CheckCommand, TheRhoneIsWhole) {
     const SyncPlan plan = subcatchments->PlanZones(subcatchments->FindZones());
     EXPECT_TRUE(plan.added.empty() && plan.removed.empty());
   }
+}
+
+/// Runs a command; gives its status.
+int Tervane(const std::vector<std::string>& arguments, std::string& out) {
+  std::ostringstream results, messages;
+  const int status = RunCommandLine(arguments, results, messages);
+  out = results.str();
+  return status;
+}
+
+TEST(CheckCommand, CoverageTellsHowTheDataFit) {
+  std::string out;
+  EXPECT_EQ(Tervane({"check", "--coverage", kFolder + "rhone_xyz.tvd"}, out), kDone) << out;
+  EXPECT_THAT(out, testing::HasSubstr("simulation: 2012-01-01 to 2015-12-31\ndomain: 5285 of 142 x 97 cells"));
+  EXPECT_THAT(out, testing::ContainsRegex("ok +Topography +dem.xyz.txt +13774 points +covers the domain"));
+  // Of the year 2013, area-weighted: what the stations' columns and their shares give.
+  EXPECT_THAT(out, testing::ContainsRegex("  domain \\(100%\\) +[0-9.]+ +[0-9.]+ +[0-9.]+ +[0-9.]+ +[0-9.]+\n"));
+
+  EXPECT_EQ(Tervane({"check", "--coverage", "--json", kFolder + "rhone_faults.tvd"}, out), kFindings);
+  rapidjson::Document json;
+  json.Parse(out.c_str());
+  ASSERT_FALSE(json.HasParseError());
+  EXPECT_EQ(json["domainCells"].GetInt(), 5285);
+  std::map<std::string, std::string> states;
+  for (const auto& file : json["files"].GetArray()) states[file["path"].GetString()] = file["state"].GetString();
+  EXPECT_EQ(states["Catchment/SHAPE_FILE"], "ok");
+  EXPECT_EQ(states["Topography/NDS_2D_DATA_FILE"], "error");
+  EXPECT_EQ(states["Climate/PrecipitationRate/TIME_SERIES_1/TIME_SERIES_FILE"], "warning");
+  const auto& rain = json["forcings"][0];
+  EXPECT_STREQ(rain["kind"].GetString(), "total");
+  EXPECT_STREQ(rain["unit"].GetString(), "mm");
+  double shares = 0, weighted = 0, domain = 0;
+  for (const auto& column : rain["columns"].GetArray()) {
+    const double value = column["values"][1]["value"].GetDouble();
+    if (std::string(column["name"].GetString()) == "domain") {
+      domain = value;
+      continue;
+    }
+    shares += column["share"].GetDouble();
+    weighted += column["share"].GetDouble() * value;
+  }
+  EXPECT_NEAR(shares, 1, 1e-9);
+  EXPECT_NEAR(weighted, domain, 1e-6 * domain);
+}
+
+TEST(CheckCommand, InfoTellsOfPointsAndShapes) {
+  std::string out;
+  EXPECT_EQ(Tervane({"data", "info", kFolder + "dem.xyz.txt"}, out), kDone);
+  EXPECT_THAT(out, testing::HasSubstr("13774 points, x 323500 to 464500, y 5075500 to 5171500"));
+  EXPECT_EQ(Tervane({"data", "info", kFolder + "domain.shp"}, out), kDone);
+  EXPECT_THAT(out, testing::HasSubstr("1 polygons, x 329000 to 459000"));
+  EXPECT_THAT(out, testing::HasSubstr("attribute CODE: whole number"));
 }
 
 }  // namespace

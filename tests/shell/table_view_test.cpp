@@ -137,5 +137,20 @@ TEST(TableView, AValueThatTheCellRefusesStaysInItsEditor) {
   EXPECT_EQ(table.Value("ExtraParams/ExtraParam_1:Value"), "12");
 }
 
+TEST(TableView, WhatIsOnlyShownHasLinksAndNothingToChange) {
+  test::OpenedSetup setup;
+  setup.Command("Data Coverage");
+  // The board is computed beside the window.
+  auto* table = setup.Frame().findChild<TableView*>();
+  ASSERT_TRUE(table);
+  auto* view = table->findChild<QTableView*>();
+  ASSERT_TRUE(QTest::qWaitFor([&] { return view->model()->rowCount() > 0; }));
+  EXPECT_EQ(view->model()->index(0, 0).data().toString(), "Model Domain and Grid");
+  EXPECT_FALSE(view->model()->flags(view->model()->index(0, 0)) & Qt::ItemIsEditable);
+  for (const QToolButton* button : table->findChildren<QToolButton*>()) EXPECT_FALSE(button->isVisible());
+  QTest::mouseClick(view->viewport(), Qt::LeftButton, {}, view->visualRect(view->model()->index(0, 0)).center());
+  EXPECT_TRUE(QTest::qWaitFor([&] { return setup.Frame().CurrentPath() == "Catchment"; }));
+}
+
 }  // namespace
 }  // namespace tervane

@@ -177,7 +177,8 @@ TEST_F(Coverage, WeighsStationsByTheirShareOfTheDomain) {
   EXPECT_THAT(valuesOf(2),
               ElementsAre(testing::DoubleEq(3 * 366), testing::DoubleEq(3 * 365), testing::DoubleEq(3 * 365)));
   EXPECT_DOUBLE_EQ(*found->columns[0].share, 0.3);
-  EXPECT_THAT(found->remarks, ElementsAre("10 cells of the domain belong to no station"));
+  EXPECT_THAT(found->remarks,
+              ElementsAre(testing::Field(&Finding::text, "10 cells of the domain belong to no station")));
   EXPECT_EQ(RowOf(*board, "stations.shp").missing, 10U);
   // One station fills the gaps between the polygons.
   rain.Stations().ShapeGapFillName = west.NAME;
