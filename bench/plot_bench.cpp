@@ -5,6 +5,8 @@
 // toolkit's own drawing of a picture of as many pixels, turned and shrunk alike.
 #include <QApplication>
 #include <QPainter>
+#include <QSlider>
+#include <QTemporaryDir>
 #include <QTimer>
 #include <algorithm>
 #include <chrono>
@@ -17,10 +19,13 @@
 #include <qcustomplot.h>
 
 #include "bench/desktop_figures.h"
+#include "platform/datafile_writer.h"
 #include "platform/grid_files.h"
 #include "platform/grid_interpolation.h"
+#include "shell/data_viewer.h"
 #include "shell/map_canvas.h"
 #include "shell/map_view.h"
+#include "shell/qt_text.h"
 #include "shell/series_plot.h"
 #include "shell/theme.h"
 
@@ -153,6 +158,48 @@ void MeasureInterpolation() {
   Tell("  from cancelling to the end of the work", Milliseconds([&] { computed->Run(cancelled); }), 50, "ms");
 }
 
+void MeasureViewer() {
+  constexpr int kCells = 1000, kSteps = 100;
+  const QTemporaryDir folder;
+  const std::string path = FromQt(folder.filePath("heads.nds2"));
+  NewDataFile content;
+  content.geometry.nx = content.geometry.ny = kCells;
+  content.geometry.cellSize = 50;
+  content.items = {{"Head", 100180, 1000, {}}};
+  DataFileWriter writer;
+  std::string error = writer.Create(path, content);
+  std::vector<float> values(static_cast<std::size_t>(kCells) * kCells);
+  for (int step = 0; step < kSteps && error.empty(); ++step) {
+    for (std::size_t i = 0; i < values.size(); ++i)
+      values[i] = static_cast<float>(i % 977 + static_cast<std::size_t>(step));
+    error = writer.AddStep(CYbDateTime(2000, 1, 1) + CYbDateTimeSpan{86400 * step});
+    if (error.empty()) error = writer.Put(1, values);
+  }
+  if (error.empty()) error = writer.Finish().error;
+  if (!error.empty()) return fmt::print("no file: {}\n", error);
+  NobodyToAsk host;
+  const DisplayUnits units;
+  std::unique_ptr<DataViewer> viewer;
+  const double answer = Milliseconds([&] {
+    viewer = std::make_unique<DataViewer>(path, host, units);
+    viewer->resize(kSize);
+    viewer->show();
+    viewer->grab();
+  });
+  const auto wait = [&] {
+    WatchEvents([&] { return !viewer->findChild<MapView*>()->IsBusy(); }, [](double) {});
+    viewer->grab();
+  };
+  Tell("a data file of 400 MB: until its tab answers", answer, 200, "ms");
+  Tell("  until its map", answer + Milliseconds(wait), 500, "ms");
+  auto* steps = viewer->findChild<QSlider*>();
+  Tell("  another time step, until its map", MedianOf([&] {
+         steps->setValue(steps->value() + 1);
+         wait();
+       }),
+       100, "ms");
+}
+
 void MeasureSeries() {
   constexpr std::size_t kValues = 100'000;
   SeriesContent content;
@@ -189,6 +236,7 @@ void Measure() {
   MeasureMap("25 million codes, turned", 20, true);
   MeasurePeer();
   MeasureInterpolation();
+  MeasureViewer();
   MeasureSeries();
 }
 

@@ -79,6 +79,11 @@ DataViewer::DataViewer(const std::string& path, Host& host, const DisplayUnits& 
   Reload(true);
 }
 
+DataViewer::~DataViewer() {
+  // What shows the file goes before the file does.
+  delete whole_;
+}
+
 QString DataViewer::Title() const { return QFileInfo(ToQt(Path())).fileName(); }
 
 QWidget* DataViewer::BuildChoices() {

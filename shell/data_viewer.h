@@ -33,6 +33,7 @@ class DataViewer : public QWidget {
  public:
   /// The user's units must outlive the viewer.
   DataViewer(const std::string& path, Host& host, const DisplayUnits& units);
+  ~DataViewer() override;
 
   const std::string& Path() const { return file_.Path(); }
   /// The name of the file.

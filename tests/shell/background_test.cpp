@@ -2,18 +2,22 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/background.h"
 
-#include <QLabel>
+#include <QApplication>
+#include <QProgressDialog>
 #include <QPushButton>
 #include <QTest>
+#include <QTimer>
 #include <atomic>
 #include <memory>
 #include <thread>
+#include <utility>
 
 #include <gmock/gmock.h>
 
 #include "platform/grid_files.h"
 #include "shell/map_canvas.h"
 #include "shell/map_view.h"
+#include "shell/qt_host.h"
 #include "spatial/data2d.h"
 #include "tests/shell/opened_setup.h"
 
@@ -114,6 +118,28 @@ TEST(Background, WhatTheUserCancelsStaysSoUntilItIsStartedAgain) {
   grid.state->mayEnd = true;
   map.Button()->click();
   ASSERT_TRUE(Comes([&] { return map.Grids() == 1; }));
+}
+
+TEST(Background, ADialogWaitsForWhatTheUserHasAskedFor) {
+  OpenedSetup setup;
+  QtHost host(&setup.Window(), setup.Program().Settings());
+  for (const bool isCancelled : {true, false}) {
+    SCOPED_TRACE(isCancelled);
+    SlowGrid grid;
+    bool wasShown = false;
+    QTimer timer;
+    QObject::connect(&timer, &QTimer::timeout, [&] {
+      auto* dialog = qobject_cast<QProgressDialog*>(QApplication::activeModalWidget());
+      if (!dialog || std::exchange(wasShown, true)) return;
+      EXPECT_EQ(dialog->labelText(), "Interpolating dem.txt");
+      isCancelled ? dialog->findChild<QPushButton*>()->click() : void(grid.state->mayEnd = true);
+    });
+    timer.start(5);
+    EXPECT_EQ(host.Compute(grid.computation), !isCancelled);
+    EXPECT_TRUE(wasShown);
+    EXPECT_EQ(grid.state->ended, grid.state->begun);
+    EXPECT_EQ(grid.computation->IsDone(), !isCancelled);
+  }
 }
 
 TEST(Background, APageShowsTheGridThatIsComputedInTheForeground) {
