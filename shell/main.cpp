@@ -97,7 +97,10 @@ int Run(const Typed& typed, QApplication& application) {
   }
   if (window.Frame()) window.Frame()->Settle();
   // Layouts settle when events have run, and maps when they are computed.
-  for (int i = 0; i < 3; ++i) application.processEvents();
+  const auto settle = [&application] {
+    for (int i = 0; i < 3; ++i) application.processEvents();
+  };
+  settle();
   const auto isBusy = [&window] {
     return std::ranges::any_of(window.findChildren<PlotFrame*>(), [](const auto* plot) { return plot->IsBusy(); });
   };
@@ -105,6 +108,7 @@ int Run(const Typed& typed, QApplication& application) {
   QTimer tick;
   tick.start(10);
   while (isBusy() && !deadline.hasExpired()) application.processEvents(QEventLoop::WaitForMoreEvents);
+  settle();
   if (!WithFewColors(window.grab().toImage()).save(ToQt(typed.screenshot))) {
     std::fprintf(stderr, "quarzel: %s cannot be written\n", typed.screenshot.c_str());
     return 2;
