@@ -10,6 +10,7 @@
 
 #include "platform/datafile.h"
 #include "platform/grid_files.h"
+#include "platform/grid_polygons.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "simspec/periods.h"
@@ -213,33 +214,15 @@ void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
 }
 
 void Preprocessor::ShowZones(CodedZonesKvf& zones, ReportPage& page) {
-  ZoneSource source;
-  if (zones.UsesGridCodes()) {
-    source.gridFile = zones.GridFile().File.Absolute();
-    source.item = zones.GridFile().SelectedItem();
-  } else if (zones.UsesPolygons()) {
-    source.polygons = {zones.ShapeFile().File.Absolute(), zones.ShapeFile().Attribute(),
-                       IdOfItem(zones, zones.ShapeGapFillName), zones.ShapeAxisUnit};
-  } else {
-    return page.ShowText("One zone for the whole area.");
-  }
-  ShowZoneMap(zones, source, page);
+  if (zones.DistributionType == CodedZonesKvf::kUniform) return page.ShowText("One zone for the whole area.");
+  ShowZoneMap(zones, zones.CurrentSource(), page);
 }
 
 void Preprocessor::ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page) {
   const CGlobalKvf& global = forcing.Global();
-  const CStationBasedKvf& stations = forcing.Stations();
-  ZoneSource source;
   switch (forcing.DistributionType) {
     case C2DStationBasedDataKvf::kStationBased:
-      if (forcing.UsesGridCodes()) {
-        source.gridFile = stations.GridFile().File.Absolute();
-        source.item = stations.GridFile().SelectedItem();
-      } else {
-        source.polygons = {stations.ShapeFile().File.Absolute(), stations.ShapeFile().Attribute(),
-                           IdOfItem(forcing, stations.ShapeGapFillName), stations.ShapeAxisUnit};
-      }
-      return ShowZoneMap(forcing, source, page);
+      return ShowZoneMap(forcing, forcing.Stations().CurrentSource(), page);
     case C2DStationBasedDataKvf::kFullyDistributed: {
       const CFMData2DNdsFile& file = forcing.FullyDistributed().GridFile();
       auto make = [path = file.File.Absolute(), item = file.SelectedItem(), start = period_->GetSimStartDate(),
@@ -262,11 +245,12 @@ void Preprocessor::ShowSeries(bool isConstant, float value, int itemType, const 
     page.ShowSeries(file.File.Absolute(), file.SelectedItem(), period_->GetSimStartDate(), period_->SIMEND);
 }
 
-void Preprocessor::ShowZoneMap(CFMSEKvfBase& owner, const ZoneSource& source, ReportPage& page) {
+void Preprocessor::ShowZoneMap(CFMSEKvfBase& owner, const GridSource& source, ReportPage& page) {
   const auto table = std::make_shared<ZoneTable>();
-  auto make = [source, table, geometry = domain_->Geometry()](CTvn2DOrthoRotatedGridData& grid) {
-    if (!source.gridFile.empty()) return ReadGridData(source.gridFile, source.item, grid);
-    return grid.CreateGridData_GIS_Polygon(geometry, kUsualDeleteValue, source.polygons, *table);
+  auto make = [source, table](CTvn2DOrthoRotatedGridData& grid) {
+    if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid);
+    const PolygonFile polygons{source.file, source.attribute, source.gapFill, source.axisUnit};
+    return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, *table);
   };
   auto nameOfCode = [&owner, table](int code) -> std::string {
     std::string id = std::to_string(code);

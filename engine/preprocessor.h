@@ -11,7 +11,6 @@
 #include "engine/model_grids.h"
 #include "engine/report.h"
 #include "platform/grid.h"
-#include "platform/grid_polygons.h"
 
 namespace tervane {
 
@@ -22,13 +21,7 @@ class CSimPeriodKvf;
 class CFMData0DFile;
 class CFMSEKvfBase;
 class CodedZonesKvf;
-
-/// Where the areas of zones or stations come from.
-struct ZoneSource {
-  std::string gridFile;  ///< Of codes; empty for polygons.
-  int item = 1;
-  PolygonFile polygons;
-};
+struct GridSource;
 
 /// Puts everything that varies over the model area on the cells of the model, and reports what it made as a tree of
 /// pages that mirrors the setup's. A kind of node is known here by its family alone, so that a new member of a family
@@ -57,7 +50,7 @@ class Preprocessor {
   /// A constant as text, or a series.
   void ShowSeries(bool isConstant, float value, int itemType, const CFMData0DFile& file, ReportPage& page);
   /// A map of the codes of zones or stations.
-  void ShowZoneMap(CFMSEKvfBase& owner, const ZoneSource& source, ReportPage& page);
+  void ShowZoneMap(CFMSEKvfBase& owner, const GridSource& source, ReportPage& page);
   void ShowGrid(ModelGrid grid, ReportPage& page);
   std::string SummaryText() const;
 

@@ -100,7 +100,8 @@ FileResult ReadGeoInfoFromNdsFile(const std::string& path, int number, GridGeome
 }
 
 std::string ItemNameOf(const std::string& path, int number) {
-  const DataItem* item = DataFileFactsOf(path)->Item(number);
+  const auto file = DataFileFactsOf(path);
+  const DataItem* item = file->Item(number);
   return item ? item->name : std::string();
 }
 
