@@ -242,10 +242,10 @@ void PrintCodes(const char* what, const std::vector<float>& values) {
 
 // ---- Boundary
 
-/// A domain over nearly the whole large grid, with a jagged boundary.
-std::vector<float> JaggedDomain() {
+/// A domain over nearly the whole large grid, whose boundary goes in and out by that part of the grid.
+std::vector<float> RoundDomain(double inAndOut) {
   std::mt19937 random(4);
-  std::uniform_real_distribution<double> radius(0.45 * kLargeSide, 0.49 * kLargeSide);
+  std::uniform_real_distribution<double> radius((0.49 - inAndOut) * kLargeSide, 0.49 * kLargeSide);
   constexpr int kCorners = 20'000;
   Shape shape;
   for (int i = 0; i < kCorners; ++i) {
@@ -260,12 +260,7 @@ std::vector<float> JaggedDomain() {
 /// The time of tracing the boundary, for a smooth and a jagged one.
 void PrintTrace() {
   constexpr double kLimit = 500;
-  std::vector<float> square(kLarge.CellCount(), 1.0F);
-  for (std::size_t i = 0; i < kLargeSide; ++i)
-    for (const std::size_t cell :
-         {i, (kLargeSide - 1) * std::size_t{kLargeSide} + i, i * kLargeSide, i * kLargeSide + kLargeSide - 1})
-      square[cell] = 2.0F;
-  for (const auto& [what, values] : {std::pair{"square", square}, std::pair{"jagged", JaggedDomain()}}) {
+  for (const auto& [what, values] : {std::pair{"smooth", RoundDomain(0)}, std::pair{"jagged", RoundDomain(0.04)}}) {
     std::vector<double> times;
     std::size_t cells = 0;
     std::string message;

@@ -20,6 +20,7 @@ class CCoverageKvf : public CTvnKvfGroupBase {
   }
 
   int IsDlgUsedInSetup() override { return 0; }
+  bool HoldsSetup() const override { return false; }
   int AddToOverview(std::vector<OverviewLine>& /*lines*/, int /*level*/) override { return 1; }
 
   /// The computing of the board of the setup as it is, its latest validation included; the same one as long as neither

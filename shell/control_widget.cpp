@@ -408,7 +408,7 @@ class ShownWidget : public ControlWidget {
     if (!control.beside) MakeLabel();
     value_ = new QLabel;
     value_->setTextInteractionFlags(Qt::TextSelectableByMouse);
-    MakeField(value_, false);
+    MakeField(value_, control.unit.empty() && control.itemType == 0);
   }
 
  protected:

@@ -42,7 +42,7 @@ std::string TitleOf(const CYbSEKvfBase& node) {
   if (!shown) return node.GetTitle();
   const std::string& name = shown->GetAbbreviatedTitle();
   const bool isOneOfMany = dynamic_cast<const CFMSEKvfGroupBase*>(shown) != nullptr;
-  return isOneOfMany && !name.empty() ? fmt::format("{}: {}", shown->GetTitle(), name) : shown->GetTitle();
+  return isOneOfMany && !name.empty() ? fmt::format("{}: {}", name, shown->GetTitle()) : shown->GetTitle();
 }
 
 DomainSource DomainOf(const CYbSEKvfBase& root) {
@@ -67,14 +67,14 @@ std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
   return TimeSpan{start.SecondsSinceEpoch(), end.SecondsSinceEpoch()};
 }
 
-CoverageFile AskFile(const NodePlace& place, FileUse use) {
+CoverageFile AskFile(const CYbSEKvfBase& node, FileUse use) {
   CoverageFile file;
-  file.path = place.path;
-  file.serial = place.node.Serial();
-  file.title = TitleOf(place.node);
-  file.findings = place.node.Findings();
+  file.path = PathOf(node);
+  file.serial = node.Serial();
+  file.title = TitleOf(node);
+  file.findings = node.Findings();
   // What the owner makes of the file, or its grid as it is.
-  if (auto* owner = dynamic_cast<CellValues*>(place.node.GetParent()); owner && use.isOverArea) {
+  if (auto* owner = dynamic_cast<CellValues*>(node.GetParent()); owner && use.isOverArea) {
     file.values = owner->CurrentSource();
     file.grid = owner->GridComputation();
   } else if (use.isOverArea && use.kind == FileUse::Kind::Data) {
@@ -88,19 +88,25 @@ CoverageFile AskFile(const NodePlace& place, FileUse use) {
   return file;
 }
 
+/// Asks what takes part below a node that does.
+void AskBelow(const CYbSEKvfBase& node, CoverageRequest& request) {
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
+    if (!child->HoldsSetup() || !child->IsDlgUsedInSetup()) continue;
+    if (const auto* user = dynamic_cast<const FileUser*>(child))
+      if (std::optional<FileUse> use = user->UsedFile()) request.files.push_back(AskFile(*child, *std::move(use)));
+    if (const auto* forcing = dynamic_cast<const ForcingNode*>(child))
+      request.forcings.push_back({PathOf(*child), child->Serial(), forcing->CurrentForcing()});
+    AskBelow(*child, request);
+  }
+}
+
 }  // namespace
 
 CoverageRequest AskCoverage(CYbSEKvfBase& root) {
   CoverageRequest request;
   request.simulation = SimulationOf(root);
   request.domain = DomainOf(root);
-  WalkNodes(root, [&](const NodePlace& place) {
-    if (!place.takesPart) return;
-    if (const auto* user = dynamic_cast<const FileUser*>(&place.node))
-      if (std::optional<FileUse> use = user->UsedFile()) request.files.push_back(AskFile(place, *std::move(use)));
-    if (const auto* forcing = dynamic_cast<const ForcingNode*>(&place.node))
-      request.forcings.push_back({place.path, place.node.Serial(), forcing->CurrentForcing()});
-  });
+  AskBelow(root, request);
   return request;
 }
 
@@ -569,7 +575,8 @@ void BoardMaker::AddDomainColumn(ForcingTotals& totals) {
                                           withoutStation.empty() ? "" : ": those of ", fmt::join(withoutStation, ", ")),
                               {},
                               {}});
-  totals.columns.push_back(std::move(mean));
+  // Of many stations the mean is looked for first.
+  totals.columns.insert(totals.columns.begin(), std::move(mean));
 }
 
 AreaCells BoardMaker::CellsOf(const GridSource& source) {

@@ -25,7 +25,7 @@ namespace tervane {
 struct CoverageFile {
   std::string path;          ///< Of its node.
   std::uint64_t serial = 0;  ///< Of its node.
-  std::string title;         ///< What it holds: "Topography", "Precipitation Rate: Sion".
+  std::string title;         ///< What it holds: "Topography", "Sion: Precipitation Rate".
   FileUse use;
   std::optional<GridSource> values;         ///< The quantity that is to have a value in every cell of the domain.
   std::vector<Finding> findings;            ///< Of its node.

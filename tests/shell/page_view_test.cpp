@@ -148,12 +148,12 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
       setup.Frame().RebuildProcessedData();
       int pages = 0;
       std::vector<std::string> paths{"CCoverageKvf"};
-      for (const TreeEntry& entry : TreeEntries(setup.Session().Document().Root(), kSetupDataTree))
-        paths.push_back(entry.path);
+      const auto add = [&](int tree) {
+        for (const TreeEntry& entry : TreeEntries(setup.Session().Document().Root(), tree)) paths.push_back(entry.path);
+      };
+      add(kSetupDataTree);
       // What the preprocessor left is the same of all setups.
-      if (sections == kSetups[0])
-        for (const TreeEntry& entry : TreeEntries(setup.Session().Document().Root(), kProcessedDataTree))
-          paths.push_back(entry.path);
+      if (sections == kSetups[0]) add(kProcessedDataTree);
       for (const std::string& path : paths) {
         SCOPED_TRACE(path + " at " + std::to_string(zoom));
         setup.GoTo(path);

@@ -171,12 +171,12 @@ TEST_F(Coverage, WeighsStationsByTheirShareOfTheDomain) {
     for (const PeriodSum& sum : found->columns[column].sums) values.push_back(found->form.Of(sum));
     return values;
   };
-  EXPECT_THAT(valuesOf(0), ElementsAre(366, 365, 365));
-  EXPECT_THAT(valuesOf(1), ElementsAre(4 * 366, 4 * 365, 4 * 365));
+  EXPECT_THAT(valuesOf(1), ElementsAre(366, 365, 365));
+  EXPECT_THAT(valuesOf(2), ElementsAre(4 * 366, 4 * 365, 4 * 365));
   // A third of the area that has a station is the west's.
-  EXPECT_THAT(valuesOf(2),
+  EXPECT_THAT(valuesOf(0),
               ElementsAre(testing::DoubleEq(3 * 366), testing::DoubleEq(3 * 365), testing::DoubleEq(3 * 365)));
-  EXPECT_DOUBLE_EQ(*found->columns[0].share, 0.3);
+  EXPECT_DOUBLE_EQ(*found->columns[1].share, 0.3);
   EXPECT_THAT(found->remarks,
               ElementsAre(testing::Field(&Finding::text, "10 cells of the domain belong to no station")));
   EXPECT_EQ(RowOf(*board, "stations.shp").missing, 10U);
