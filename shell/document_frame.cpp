@@ -413,7 +413,7 @@ void DocumentFrame::TellRunEnd(bool isDone, bool wasFound) {
   if (!isDone && !run_->Messages().empty())
     answers.push_back({tr("Show the &Findings"), [this] { bottomTabs_->setCurrentWidget(findings_); }});
   runBanner_ = new Banner(text, answers);
-  all_->insertWidget(0, runBanner_);
+  AddBanner(runBanner_);
   QApplication::alert(this);
   CheckProcessedData();
   emit StateChanged();

@@ -21,7 +21,7 @@ namespace tervane {
 namespace {
 
 constexpr int kWidestForm = 860;  ///< In pixels at zoom 1: lines stay short enough to be read.
-constexpr int kSideBySide = 880;  ///< From this width of a page on its map stands beside the form.
+constexpr int kSideBySide = 760;  ///< From this width of a page on its map stands beside the form.
 constexpr int kFormBesidePlot = 530;
 constexpr int kMostFindings = 4;  ///< Lines below a form; the tab of findings has them all.
 
@@ -261,8 +261,9 @@ void PageView::PlacePlots() {
   const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
   const int neededWidth = scroll_->widget()->minimumSizeHint().width() + bar;
   // Above a map the form takes no more than it needs.
-  const int form =
-      isWide ? std::clamp(neededWidth, theme.Scaled(kFormBesidePlot), all * 3 / 5) : std::min(neededHeight, all / 2);
+  const int most = isWide ? all * 3 / 5 : all / 2;
+  const int form = isWide ? std::clamp(neededWidth, std::min(theme.Scaled(kFormBesidePlot), most), most)
+                          : std::min(neededHeight, most);
   // What the user has moved stays until the page is another one.
   if (split_->orientation() == orientation && formSize_ == form) return;
   formSize_ = form;
