@@ -247,7 +247,8 @@ void PageView::AddPlot(Control& control) {
     column->setContentsMargins(margin, 0, margin, margin);
   }
   ControlWidget& made = *widgets_.emplace_back(ControlWidget::Make(page_, control));
-  plotPlace_->layout()->addWidget(made.Field());
+  // A chart and a map below each other share the height.
+  static_cast<QVBoxLayout*>(plotPlace_->layout())->addWidget(made.Field(), 1);
   plots_.push_back(&control);
 }
 

@@ -8,7 +8,6 @@
 #include "platform/datafile_facts.h"
 #include "platform/paths.h"
 #include "platform/shapes.h"
-#include "platform/text.h"
 #include "platform/units.h"
 #include "platform/xyz_text.h"
 #include "spatial/domain.h"
@@ -53,8 +52,8 @@ FilePlace PlaceOfShapes(const FileUse& use) {
 }
 
 std::string BoxInWords(const Envelope& box) {
-  return fmt::format("x {} to {}, y {} to {}", ShortestNumber(box.xMin), ShortestNumber(box.xMax),
-                     ShortestNumber(box.yMin), ShortestNumber(box.yMax));
+  return fmt::format("x {} to {}, y {} to {}", FormatNumber(box.xMin, "%.9g"), FormatNumber(box.xMax, "%.9g"),
+                     FormatNumber(box.yMin, "%.9g"), FormatNumber(box.yMax, "%.9g"));
 }
 
 bool Overlap(const Envelope& a, const Envelope& b) {
