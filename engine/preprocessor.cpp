@@ -38,7 +38,7 @@ std::string WithUnit(double value, int itemType) {
   if (!type) return FormatNumber(value, "%.6g");
   const std::string number = FormatQuantity(value, *type, BaseUnit(*type).key);
   const std::string_view unit = BaseUnit(*type).abbreviation;
-  return unit.empty() ? number : fmt::format("{} {}", number, unit);
+  return unit.empty() || unit == "-" ? number : fmt::format("{} {}", number, unit);
 }
 
 /// The mean of the steps of a file of grids that end within a period, or of all steps where the file has no dates.
@@ -282,6 +282,9 @@ std::string Preprocessor::SummaryText() const {
       for (const auto& [code, count] : grid.cellsOfCode)
         text +=
             fmt::format("    {}, {}: {:.6g} km2\n", code, grid.nameOfCode(code), static_cast<double>(count) * cellArea);
+    } else if (grid.values.smallest == grid.values.largest) {
+      text += fmt::format("{}: {} everywhere\n", grid.title,
+                          WithUnit(static_cast<double>(grid.values.largest), grid.itemType));
     } else {
       text += fmt::format("{}: {} to {}, mean {}\n", grid.title,
                           WithUnit(static_cast<double>(grid.values.smallest), grid.itemType),
