@@ -41,7 +41,8 @@ std::string WithUnit(double value, int itemType) {
   return unit.empty() || unit == "-" ? number : fmt::format("{} {}", number, unit);
 }
 
-/// The mean of the steps of a file of grids that end within a period, or of all steps where the file has no dates.
+/// The mean of the steps of a file of grids that share some time with a period, or of all steps where the file has no
+/// dates.
 FileResult MeanOfSteps(const std::string& path, int number, const CYbDateTime& start, const CYbDateTime& end,
                        CTvn2DOrthoRotatedGridData& grid) {
   // The first step brings geometry and unit.
@@ -53,7 +54,10 @@ FileResult MeanOfSteps(const std::string& path, int number, const CYbDateTime& s
   std::vector<std::uint32_t> counts(cells, 0);
   std::vector<float> values(cells);
   for (std::size_t step = 0; step < file.Time().steps; ++step) {
-    if (file.Time().hasDates && (file.Time().Stamp(step) < start || end < file.Time().Stamp(step))) continue;
+    // A stamp is the end of its step.
+    const bool isWithin =
+        !file.Time().hasDates || (file.Time().Stamp(step) > start && (step == 0 || file.Time().Stamp(step - 1) < end));
+    if (!isWithin) continue;
     if (const std::string error = file.Read({number, step, 1, {}}, values, grid.ItemType()); !error.empty())
       return {error, {}};
     for (std::size_t cell = 0; cell < cells; ++cell) {
@@ -107,10 +111,8 @@ bool Preprocessor::CheckSetup() {
     if (!problem.empty()) return log_.Error(place.path + ":FILE_NAME", problem);
     for (const Finding& finding : place.node.Findings()) {
       const std::string where = PlaceOf(place.path, finding);
-      if (finding.severity == Severity::Error)
-        log_.Error(where, WithDetail(finding));
-      else
-        log_.Warning(where, WithDetail(finding));
+      if (finding.severity == Severity::Error) log_.Error(where, WithDetail(finding));
+      if (finding.severity == Severity::Warning) log_.Warning(where, WithDetail(finding));
     }
   });
   return log_.Errors() == 0;

@@ -8,11 +8,14 @@
 
 #include "core/kvf.h"
 #include "execution/execute_flags.h"
+#include "platform/datafile_writer.h"
 #include "platform/grid_files.h"
 #include "simspec/model_components.h"
+#include "simspec/periods.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
+#include "surface/climate.h"
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -107,11 +110,34 @@ TEST_F(EngineProgram, TellsCellsWithoutValueAndZonesByName) {
   EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("8, Upper valley: 0.03 km2"));
 }
 
+TEST_F(EngineProgram, TakesTheMeanOfTheStepsOfTheSimulation) {
+  NewDataFile content;
+  content.geometry = FileGeometryOf({4, 4, 100, 1000, 2000, 0, {}});
+  content.items = {{"Rain", 100431, 2004, ValueType::MeanStep}};
+  DataFileWriter writer;
+  ASSERT_EQ(writer.Create(folder.File("rain.nds2"), content), "");
+  // The first step ends where the simulation begins.
+  for (const int day : {1, 2, 3}) {
+    ASSERT_EQ(writer.AddStep({2000, 1, day}), "");
+    ASSERT_EQ(writer.Put(1, std::vector<float>(16, static_cast<float>(100 / day))), "");
+  }
+  ASSERT_EQ(writer.Finish().error, "");
+  document.Root().Important<CSimPeriodKvf>("SIMPERIOD")->SIMEND = {2000, 1, 3};
+  auto& rain = *document.Root().Important<CPrecipitationKvf>("PRECIPITATION");
+  rain.DistributionType = C2DStationBasedDataKvf::kFullyDistributed;
+  rain.FullyDistributed().GridFile().Choose(FileName("rain.nds2", folder.Path()));
+
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_FLOAT_EQ(Values(3)[0], (50 + 33) / 2.0F);
+  EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("mean of the time steps: 41.5 mm/day everywhere"));
+}
+
 /// A real catchment with stations, snow and zones.
 TEST(EngineProgramExample, ReportsTheRhone) {
   test::TempFolder folder;
   std::filesystem::copy(std::string(TERVANE_SOURCE_DIR) + "/examples/rhone", folder.Path(),
                         std::filesystem::copy_options::recursive);
+  std::filesystem::remove(folder.File("subbasins.prj"));  // worth a note to who edits, and nothing here
   std::ostringstream out;
   ASSERT_EQ(RunEngineProgram({folder.File("rhone.tvd"), "/PP"}, out), kEngineDone) << out.str();
   EXPECT_THAT(out.str(), Not(HasSubstr("warning")));
