@@ -417,7 +417,6 @@ void DocumentFrame::TellRunEnd(bool isDone, bool wasFound) {
   QApplication::alert(this);
   CheckProcessedData();
   emit StateChanged();
-  emit RunEnded();
 }
 
 void DocumentFrame::Settle() {

@@ -68,7 +68,7 @@ class DocumentFrame : public QWidget {
   /// Looks at the files of the shown page again, and draws all anew.
   void RefreshPlots();
   /// Reads the preprocessor's report again and shows its pages anew; the page that is shown stays where the report
-  /// still has it. To be called when a run has ended; a timer calls it when the report has changed on disk.
+  /// still has it. The end of a run and a timer call it when the report has changed on disk.
   void RebuildProcessedData();
   void Undo();
   void Redo();
@@ -97,8 +97,6 @@ class DocumentFrame : public QWidget {
   void ChangesWanted();
   /// A data file is to be shown in a viewer.
   void DataFileWanted(const QString& path);
-  /// An engine that ran the setup has ended: what it leaves in the result folder is to be read anew.
-  void RunEnded();
 
  private:
   void BuildBody();

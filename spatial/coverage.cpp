@@ -607,6 +607,16 @@ AreaCells BoardMaker::CellsOf(const GridSource& source) {
   return cells;
 }
 
+/// A length of time for people: "12.5 days", "6 hours".
+std::string TimeLengthText(std::int64_t seconds) {
+  constexpr std::int64_t kHour = 3600, kDay = 86400;
+  const auto text = [&](std::int64_t unit, const char* name) {
+    const double count = std::round(static_cast<double>(seconds) / static_cast<double>(unit) * 10) / 10;
+    return fmt::format("{} {}{}", ShortestNumber(count), name, count == 1 ? "" : "s");
+  };
+  return seconds >= kDay ? text(kDay, "day") : seconds >= kHour ? text(kHour, "hour") : text(60, "minute");
+}
+
 }  // namespace
 
 FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous, CoverageBoard& board,
@@ -624,15 +634,6 @@ FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* 
 std::string_view NameOf(CoverageState state) {
   constexpr std::string_view kNames[] = {"ok", "note", "warning", "error"};
   return kNames[static_cast<std::size_t>(state)];
-}
-
-std::string TimeLengthText(std::int64_t seconds) {
-  constexpr std::int64_t kHour = 3600, kDay = 86400;
-  const auto text = [&](std::int64_t unit, const char* name) {
-    const double count = std::round(static_cast<double>(seconds) / static_cast<double>(unit) * 10) / 10;
-    return fmt::format("{} {}{}", ShortestNumber(count), name, count == 1 ? "" : "s");
-  };
-  return seconds >= kDay ? text(kDay, "day") : seconds >= kHour ? text(kHour, "hour") : text(60, "minute");
 }
 
 std::string ForcingTotals::Heading() const {

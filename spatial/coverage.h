@@ -141,7 +141,5 @@ FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* 
 
 /// "312 cells of the domain have no topography"; empty when all have one.
 std::string MissingCellsText(const CoverageRow& row);
-/// A length of time for people: "12.5 days", "6 hours".
-std::string TimeLengthText(std::int64_t seconds);
 
 }  // namespace tervane
