@@ -19,8 +19,8 @@
 #include <unistd.h>
 
 #include "bench/median_table.h"
-#include "platform/datafile.h"
-#include "platform/datafile_writer.h"
+#include "data/datafile.h"
+#include "data/datafile_writer.h"
 
 namespace tervane::bench {
 

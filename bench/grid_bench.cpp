@@ -18,9 +18,9 @@
 #include <ogrsf_frmts.h>
 
 #include "bench/median_table.h"
-#include "platform/grid.h"
-#include "platform/grid_interpolation.h"
-#include "platform/grid_polygons.h"
+#include "geometry/grid.h"
+#include "geometry/grid_interpolation.h"
+#include "geometry/grid_polygons.h"
 #include "spatial/domain_boundary.h"
 
 namespace tervane::bench {

@@ -19,15 +19,15 @@
 #include <qcustomplot.h>
 
 #include "bench/desktop_figures.h"
-#include "platform/datafile_writer.h"
-#include "platform/grid_files.h"
-#include "platform/grid_interpolation.h"
-#include "shell/data_viewer.h"
-#include "shell/map_canvas.h"
-#include "shell/map_view.h"
-#include "shell/qt_text.h"
-#include "shell/series_plot.h"
-#include "shell/theme.h"
+#include "data/datafile_writer.h"
+#include "data/grid_files.h"
+#include "geometry/grid_interpolation.h"
+#include "shell/charts/series_plot.h"
+#include "shell/editors/data_viewer.h"
+#include "shell/maps/map_canvas.h"
+#include "shell/maps/map_view.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane::bench {
 

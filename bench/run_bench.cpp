@@ -25,11 +25,11 @@
 #include "platform/files.h"
 #include "platform/os.h"
 #include "shell/document_frame.h"
-#include "shell/document_run.h"
 #include "shell/main_window.h"
 #include "shell/program.h"
-#include "shell/qt_text.h"
-#include "shell/theme.h"
+#include "shell/run/document_run.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane::bench {
 

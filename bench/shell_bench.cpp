@@ -27,8 +27,8 @@
 #include "shell/document_frame.h"
 #include "shell/main_window.h"
 #include "shell/program.h"
-#include "shell/qt_text.h"
-#include "shell/theme.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
 #include "simspec/extra_params.h"
 #include "simspec/titles.h"
 

@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/grid_resampling.h"
+#include "data/grid_resampling.h"
 
 namespace tervane {
 

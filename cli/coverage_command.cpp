@@ -10,7 +10,7 @@
 #include "cli/commands.h"
 #include "cli/json.h"
 #include "cli/setup_file.h"
-#include "platform/datafile_request.h"
+#include "data/datafile_request.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "spatial/coverage.h"

@@ -10,12 +10,12 @@
 #include "cli/command_line.h"
 #include "cli/commands.h"
 #include "cli/json.h"
-#include "platform/datafile.h"
-#include "platform/datafile_request.h"
+#include "data/datafile.h"
+#include "data/datafile_request.h"
+#include "geometry/shapes.h"
+#include "geometry/xyz_text.h"
 #include "platform/paths.h"
-#include "platform/shapes.h"
 #include "platform/text.h"
-#include "platform/xyz_text.h"
 
 namespace tervane {
 

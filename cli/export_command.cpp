@@ -8,10 +8,10 @@
 
 #include "cli/command_line.h"
 #include "cli/commands.h"
+#include "data/raster_file.h"
+#include "data/series_csv.h"
 #include "platform/files.h"
 #include "platform/paths.h"
-#include "platform/raster_file.h"
-#include "platform/series_csv.h"
 #include "platform/text.h"
 
 namespace tervane {

@@ -6,8 +6,8 @@
 #include "cli/command_line.h"
 #include "cli/commands.h"
 #include "cli/setup_file.h"
-#include "platform/grid_files.h"
-#include "platform/raster_import.h"
+#include "data/grid_files.h"
+#include "data/raster_import.h"
 #include "spatial/domain.h"
 
 namespace tervane {

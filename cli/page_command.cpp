@@ -6,7 +6,7 @@
 #include "cli/command_line.h"
 #include "cli/commands.h"
 #include "cli/setup_file.h"
-#include "pages/page.h"
+#include "forms/page.h"
 #include "pages/tree_entries.h"
 
 namespace tervane {

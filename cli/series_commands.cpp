@@ -8,11 +8,11 @@
 
 #include "cli/command_line.h"
 #include "cli/commands.h"
-#include "platform/datafile_request.h"
-#include "platform/datafile_writer.h"
+#include "data/datafile_request.h"
+#include "data/datafile_writer.h"
+#include "data/import_unit.h"
+#include "data/series_csv.h"
 #include "platform/files.h"
-#include "platform/import_unit.h"
-#include "platform/series_csv.h"
 
 namespace tervane {
 

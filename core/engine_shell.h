@@ -4,7 +4,7 @@
 
 #include <string>
 
-#include "platform/host.h"
+#include "core/host.h"
 
 namespace tervane {
 

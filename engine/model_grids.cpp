@@ -6,9 +6,9 @@
 
 #include <fmt/format.h>
 
-#include "platform/datafile_writer.h"
-#include "platform/grid_files.h"
-#include "platform/grid_resampling.h"
+#include "data/datafile_writer.h"
+#include "data/grid_files.h"
+#include "data/grid_resampling.h"
 
 namespace tervane {
 

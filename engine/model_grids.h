@@ -9,9 +9,9 @@
 #include <string>
 #include <vector>
 
+#include "data/datafile.h"
 #include "engine/engine_output.h"
-#include "platform/datafile.h"
-#include "platform/grid.h"
+#include "geometry/grid.h"
 
 namespace tervane {
 

@@ -8,9 +8,9 @@
 
 #include <fmt/format.h>
 
-#include "platform/datafile.h"
-#include "platform/grid_files.h"
-#include "platform/grid_polygons.h"
+#include "data/datafile.h"
+#include "data/grid_files.h"
+#include "geometry/grid_polygons.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "simspec/periods.h"

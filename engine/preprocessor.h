@@ -10,7 +10,7 @@
 #include "engine/engine_output.h"
 #include "engine/model_grids.h"
 #include "engine/report.h"
-#include "platform/grid.h"
+#include "geometry/grid.h"
 
 namespace tervane {
 

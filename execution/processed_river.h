@@ -9,9 +9,9 @@
 #include <string>
 #include <vector>
 
+#include "geometry/grid.h"
+#include "geometry/shapes.h"
 #include "platform/files.h"
-#include "platform/grid.h"
-#include "platform/shapes.h"
 
 namespace tervane {
 

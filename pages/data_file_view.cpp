@@ -7,7 +7,7 @@
 
 #include <fmt/format.h>
 
-#include "pages/spatial/plot_content.h"
+#include "pages/parts/plot_content.h"
 #include "platform/units.h"
 
 namespace tervane {

@@ -12,10 +12,10 @@
 #include <utility>
 #include <vector>
 
-#include "pages/entry.h"
-#include "pages/plots.h"
-#include "platform/datafile.h"
-#include "platform/grid_files.h"
+#include "data/datafile.h"
+#include "data/grid_files.h"
+#include "forms/entry.h"
+#include "forms/plots.h"
 
 namespace tervane {
 

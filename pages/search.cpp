@@ -6,8 +6,8 @@
 #include <set>
 #include <unordered_set>
 
-#include "pages/page.h"
-#include "pages/table_form.h"
+#include "forms/page.h"
+#include "forms/table_form.h"
 #include "pages/tree_entries.h"
 #include "platform/text.h"
 

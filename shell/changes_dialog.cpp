@@ -9,8 +9,8 @@
 #include <QTreeWidget>
 #include <QVBoxLayout>
 
-#include "shell/qt_text.h"
-#include "shell/theme.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane {
 

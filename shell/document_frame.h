@@ -11,7 +11,7 @@
 #include <vector>
 
 #include "document/edit_session.h"
-#include "shell/banner.h"
+#include "shell/widgets/banner.h"
 
 class QSplitter;
 class QTabWidget;

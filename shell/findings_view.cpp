@@ -10,9 +10,9 @@
 #include <QPainter>
 #include <algorithm>
 
-#include "shell/qt_text.h"
-#include "shell/row_delegate.h"
-#include "shell/theme.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/row_delegate.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane {
 

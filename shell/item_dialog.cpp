@@ -9,9 +9,9 @@
 #include <QTreeWidget>
 #include <QVBoxLayout>
 
-#include "shell/qt_text.h"
-#include "shell/row_delegate.h"
-#include "shell/theme.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/row_delegate.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane {
 

@@ -4,7 +4,7 @@
 
 #include <QDialog>
 
-#include "platform/host.h"
+#include "core/host.h"
 
 class QLabel;
 class QPushButton;

@@ -21,10 +21,10 @@
 #include "platform/os.h"
 #include "shell/document_frame.h"
 #include "shell/main_window.h"
-#include "shell/plot_frame.h"
 #include "shell/program.h"
-#include "shell/qt_text.h"
-#include "shell/theme.h"
+#include "shell/widgets/plot_frame.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
 
 namespace {
 

@@ -23,13 +23,13 @@
 #include "platform/files.h"
 #include "platform/text_fields.h"
 #include "shell/changes_dialog.h"
-#include "shell/data_viewer.h"
 #include "shell/document_frame.h"
-#include "shell/document_run.h"
+#include "shell/editors/data_viewer.h"
 #include "shell/program.h"
-#include "shell/qt_text.h"
-#include "shell/theme.h"
+#include "shell/run/document_run.h"
 #include "shell/welcome_page.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane {
 

@@ -12,9 +12,9 @@
 #include <set>
 
 #include "pages/tree_entries.h"
-#include "shell/qt_text.h"
-#include "shell/row_delegate.h"
-#include "shell/theme.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/row_delegate.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane {
 

@@ -5,7 +5,7 @@
 #include <QFileInfo>
 #include <QStandardPaths>
 
-#include "shell/qt_text.h"
+#include "shell/widgets/qt_text.h"
 
 namespace tervane {
 

@@ -10,9 +10,9 @@
 #include <QTimer>
 #include <QUrl>
 
-#include "shell/background.h"
 #include "shell/item_dialog.h"
-#include "shell/qt_text.h"
+#include "shell/widgets/background.h"
+#include "shell/widgets/qt_text.h"
 
 namespace tervane {
 

@@ -6,7 +6,7 @@
 #include <QSettings>
 #include <QWidget>
 
-#include "platform/host.h"
+#include "core/host.h"
 
 namespace tervane {
 

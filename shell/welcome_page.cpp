@@ -8,7 +8,7 @@
 #include <QLabel>
 #include <QVBoxLayout>
 
-#include "shell/theme.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane {
 

@@ -10,11 +10,11 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
-#include "platform/datafile_facts.h"
-#include "platform/datafile_request.h"
-#include "platform/grid_files.h"
-#include "platform/grid_polygons.h"
-#include "platform/shapes.h"
+#include "data/datafile_facts.h"
+#include "data/datafile_request.h"
+#include "data/grid_files.h"
+#include "geometry/grid_polygons.h"
+#include "geometry/shapes.h"
 #include "platform/text.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"

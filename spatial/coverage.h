@@ -12,7 +12,7 @@
 #include <vector>
 
 #include "core/node.h"
-#include "platform/grid.h"
+#include "geometry/grid.h"
 #include "platform/progress.h"
 #include "spatial/data_use.h"
 #include "spatial/series_totals.h"

@@ -7,8 +7,8 @@
 
 #include <fmt/format.h>
 
+#include "geometry/grid_polygons.h"
 #include "platform/file_cache.h"
-#include "platform/grid_polygons.h"
 #include "platform/paths.h"
 #include "platform/units.h"
 #include "simspec/model_components.h"

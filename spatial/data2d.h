@@ -10,9 +10,9 @@
 #include <string>
 #include <vector>
 
-#include "platform/grid.h"
-#include "platform/grid_files.h"
-#include "platform/grid_interpolation.h"
+#include "data/grid_files.h"
+#include "geometry/grid.h"
+#include "geometry/grid_interpolation.h"
 #include "spatial/data_use.h"
 #include "spatial/file_nodes.h"
 

@@ -10,9 +10,9 @@
 #include <string>
 #include <vector>
 
+#include "data/grid_files.h"
+#include "geometry/grid.h"
 #include "platform/files.h"
-#include "platform/grid.h"
-#include "platform/grid_files.h"
 
 namespace tervane {
 

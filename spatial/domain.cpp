@@ -7,7 +7,7 @@
 
 #include <fmt/format.h>
 
-#include "platform/cart.h"
+#include "geometry/cart.h"
 #include "platform/paths.h"
 #include "platform/units.h"
 #include "spatial/pages.h"

@@ -5,9 +5,9 @@
 #include <memory>
 #include <string>
 
-#include "platform/grid.h"
-#include "platform/grid_files.h"
-#include "platform/shapes.h"
+#include "data/grid_files.h"
+#include "geometry/grid.h"
+#include "geometry/shapes.h"
 #include "spatial/file_nodes.h"
 
 namespace tervane {

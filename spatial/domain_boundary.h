@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/grid.h"
+#include "geometry/grid.h"
 
 namespace tervane {
 

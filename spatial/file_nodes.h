@@ -10,8 +10,8 @@
 #include <vector>
 
 #include "core/file_selection.h"
-#include "platform/datafile_request.h"
-#include "platform/shapes.h"
+#include "data/datafile_request.h"
+#include "geometry/shapes.h"
 #include "spatial/data_use.h"
 
 namespace tervane {

@@ -4,12 +4,12 @@
 
 #include <fmt/format.h>
 
-#include "platform/cart.h"
-#include "platform/datafile_facts.h"
+#include "data/datafile_facts.h"
+#include "geometry/cart.h"
+#include "geometry/shapes.h"
+#include "geometry/xyz_text.h"
 #include "platform/paths.h"
-#include "platform/shapes.h"
 #include "platform/units.h"
-#include "platform/xyz_text.h"
 #include "spatial/domain.h"
 
 namespace tervane {

@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "core/node.h"
-#include "platform/grid.h"
+#include "geometry/grid.h"
 #include "spatial/data_use.h"
 
 namespace tervane {

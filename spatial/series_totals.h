@@ -12,8 +12,8 @@
 #include <string>
 #include <vector>
 
-#include "platform/datafile.h"
-#include "platform/datafile_facts.h"
+#include "data/datafile.h"
+#include "data/datafile_facts.h"
 #include "platform/progress.h"
 
 namespace tervane {

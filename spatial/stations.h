@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/datafile.h"
+#include "data/datafile.h"
 #include "spatial/data_use.h"
 #include "spatial/file_nodes.h"
 #include "spatial/zone_sync.h"

@@ -11,9 +11,9 @@
 #include <fmt/format.h>
 
 #include "core/kvf_writer.h"
-#include "platform/grid.h"
-#include "platform/grid_files.h"
-#include "platform/shapes.h"
+#include "data/grid_files.h"
+#include "geometry/grid.h"
+#include "geometry/shapes.h"
 #include "platform/text.h"
 #include "spatial/file_nodes.h"
 

@@ -9,8 +9,8 @@
 
 #include "core/list.h"
 #include "core/path.h"
-#include "pages/spatial/plot_content.h"
-#include "platform/datafile_request.h"
+#include "data/datafile_request.h"
+#include "pages/parts/plot_content.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 

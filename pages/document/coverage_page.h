@@ -6,8 +6,8 @@
 #include <string>
 
 #include "document/coverage_board.h"
-#include "pages/page.h"
-#include "pages/plots.h"
+#include "forms/page.h"
+#include "forms/plots.h"
 
 namespace tervane {
 

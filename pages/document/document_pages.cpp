@@ -5,11 +5,11 @@
 #include <fmt/format.h>
 
 #include "core/kvf.h"
+#include "data/grid_files.h"
 #include "execution/processed_pages.h"
 #include "pages/document/help_pages.h"
-#include "pages/spatial/plot_content.h"
+#include "pages/parts/plot_content.h"
 #include "platform/files.h"
-#include "platform/grid_files.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "platform/units.h"

@@ -3,8 +3,8 @@
 #pragma once
 
 #include "document/overview.h"
-#include "exchange/overlays.h"
-#include "pages/page.h"
+#include "forms/page.h"
+#include "overlays/overlays.h"
 
 namespace tervane {
 

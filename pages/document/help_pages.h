@@ -1,8 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// The help pages that the program carries: the files of pages/help/. To add one: pages/help/NAME.htm, with its heading
-// as title and h1, and a row in tests/pages/document/help_pages_test.cpp.
+// The help pages that the program carries: the files of pages/document/help/. To add one: pages/document/help/NAME.htm,
+// with its heading as title and h1, and a row in tests/pages/document/help_pages_test.cpp.
 #pragma once
 
 #include <string_view>

@@ -1,7 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// What cmake/EmbedTexts.cmake makes of pages/help/ when the program is built.
+// What cmake/EmbedTexts.cmake makes of pages/document/help/ when the program is built.
 #pragma once
 
 #include <span>

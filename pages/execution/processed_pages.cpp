@@ -8,9 +8,9 @@
 
 #include <fmt/format.h>
 
+#include "data/datafile.h"
 #include "document/flow_model_document.h"
-#include "pages/spatial/plot_content.h"
-#include "platform/datafile.h"
+#include "pages/parts/plot_content.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 

@@ -11,8 +11,8 @@
 #include "execution/processed_data.h"
 #include "execution/processed_pages.h"
 #include "execution/processed_river.h"
-#include "pages/page.h"
-#include "pages/plots.h"
+#include "forms/page.h"
+#include "forms/plots.h"
 
 namespace tervane {
 

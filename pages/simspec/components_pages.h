@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include "pages/page.h"
+#include "forms/page.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
 

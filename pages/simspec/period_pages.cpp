@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/simspec/period_pages.h"
 
-#include "pages/table_form.h"
+#include "forms/table_form.h"
 #include "platform/text.h"
 
 namespace tervane {

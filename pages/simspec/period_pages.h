@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include "pages/page.h"
+#include "forms/page.h"
 #include "simspec/extra_params.h"
 #include "simspec/periods.h"
 #include "simspec/titles.h"

@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/spatial/data2d_pages.h"
 
-#include "pages/spatial/create_dialogs.h"
-#include "pages/spatial/plot_content.h"
+#include "pages/parts/create_dialogs.h"
+#include "pages/parts/plot_content.h"
 #include "platform/units.h"
 
 namespace tervane {

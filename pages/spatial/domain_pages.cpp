@@ -5,9 +5,9 @@
 #include <algorithm>
 #include <iterator>
 
-#include "pages/spatial/create_dialogs.h"
-#include "pages/spatial/plot_content.h"
-#include "platform/cart.h"
+#include "geometry/cart.h"
+#include "pages/parts/create_dialogs.h"
+#include "pages/parts/plot_content.h"
 #include "platform/units.h"
 
 namespace tervane {

@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include "pages/page.h"
-#include "pages/plots.h"
+#include "forms/page.h"
+#include "forms/plots.h"
 #include "spatial/domain.h"
 
 namespace tervane {

@@ -4,8 +4,8 @@
 
 #include <fmt/format.h>
 
-#include "pages/spatial/create_dialogs.h"
-#include "pages/spatial/plot_content.h"
+#include "pages/parts/create_dialogs.h"
+#include "pages/parts/plot_content.h"
 #include "platform/units.h"
 
 namespace tervane {

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include "pages/page.h"
+#include "forms/page.h"
 #include "spatial/stations.h"
 
 namespace tervane {

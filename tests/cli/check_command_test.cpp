@@ -7,9 +7,9 @@
 #include <rapidjson/document.h>
 
 #include "cli/command_line.h"
+#include "data/grid_files.h"
 #include "document/flow_model_document.h"
-#include "platform/grid_files.h"
-#include "platform/grid_polygons.h"
+#include "geometry/grid_polygons.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"

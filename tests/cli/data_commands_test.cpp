@@ -6,9 +6,9 @@
 #include <rapidjson/document.h>
 
 #include "cli/command_line.h"
-#include "platform/cart.h"
-#include "platform/datafile_writer.h"
-#include "platform/grid_files.h"
+#include "data/datafile_writer.h"
+#include "data/grid_files.h"
+#include "geometry/cart.h"
 #include "platform/text.h"
 #include "tests/support/temp_folder.h"
 

@@ -7,7 +7,7 @@
 
 #include <fmt/format.h>
 
-#include "platform/datafile_writer.h"
+#include "data/datafile_writer.h"
 
 namespace {
 

@@ -7,9 +7,9 @@
 #include <gmock/gmock.h>
 
 #include "core/kvf.h"
+#include "data/datafile_writer.h"
+#include "data/grid_files.h"
 #include "execution/execute_flags.h"
-#include "platform/datafile_writer.h"
-#include "platform/grid_files.h"
 #include "simspec/model_components.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"

@@ -6,7 +6,7 @@
 
 #include <gmock/gmock.h>
 
-#include "platform/datafile_writer.h"
+#include "data/datafile_writer.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {

@@ -12,12 +12,12 @@
 
 #include <gmock/gmock.h>
 
-#include "shell/document_run.h"
+#include "shell/charts/series_plot.h"
 #include "shell/find_panel.h"
 #include "shell/findings_view.h"
-#include "shell/map_canvas.h"
+#include "shell/maps/map_canvas.h"
 #include "shell/node_tree.h"
-#include "shell/series_plot.h"
+#include "shell/run/document_run.h"
 #include "tests/shell/opened_setup.h"
 #include "tests/support/preprocessed_run.h"
 

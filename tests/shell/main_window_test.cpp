@@ -8,7 +8,7 @@
 
 #include <gmock/gmock.h>
 
-#include "shell/theme.h"
+#include "shell/widgets/theme.h"
 #include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
 

@@ -10,7 +10,7 @@
 
 #include <gtest/gtest.h>
 
-#include "shell/qt_text.h"
+#include "shell/widgets/qt_text.h"
 
 namespace tervane::test {
 

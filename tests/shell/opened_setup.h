@@ -16,9 +16,9 @@
 #include "document/edit_session.h"
 #include "shell/document_frame.h"
 #include "shell/main_window.h"
-#include "shell/page_view.h"
+#include "shell/page/page_view.h"
 #include "shell/program.h"
-#include "shell/qt_text.h"
+#include "shell/widgets/qt_text.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 

@@ -4,7 +4,7 @@
 
 #include <gtest/gtest.h>
 
-#include "shell/theme.h"
+#include "shell/widgets/theme.h"
 
 int main(int argc, char** argv) {
   testing::InitGoogleTest(&argc, argv);

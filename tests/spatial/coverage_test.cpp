@@ -5,9 +5,9 @@
 #include <gmock/gmock.h>
 
 #include "core/path.h"
-#include "platform/datafile_writer.h"
-#include "platform/grid_files.h"
-#include "platform/shapes.h"
+#include "data/datafile_writer.h"
+#include "data/grid_files.h"
+#include "geometry/shapes.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"

@@ -6,8 +6,8 @@
 
 #include <gmock/gmock.h>
 
-#include "platform/grid_files.h"
-#include "platform/shapes.h"
+#include "data/grid_files.h"
+#include "geometry/shapes.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "tests/support/setup.h"

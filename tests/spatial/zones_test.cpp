@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-#include "platform/grid_files.h"
+#include "data/grid_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 

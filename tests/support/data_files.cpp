@@ -4,7 +4,7 @@
 
 #include <stdexcept>
 
-#include "platform/grid_files.h"
+#include "data/grid_files.h"
 
 namespace tervane::test {
 

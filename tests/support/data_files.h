@@ -7,8 +7,8 @@
 #include <string>
 #include <vector>
 
-#include "platform/grid.h"
-#include "platform/shapes.h"
+#include "geometry/grid.h"
+#include "geometry/shapes.h"
 
 namespace tervane::test {
 

@@ -12,7 +12,7 @@
 #include <vector>
 
 #include "document/flow_model_document.h"
-#include "pages/page.h"
+#include "forms/page.h"
 
 namespace tervane::test {
 

@@ -9,8 +9,8 @@
 
 #include <fmt/format.h>
 
-#include "platform/datafile_writer.h"
-#include "platform/shapes.h"
+#include "data/datafile_writer.h"
+#include "geometry/shapes.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane::test {

@@ -7,7 +7,7 @@
 #include <gmock/gmock.h>
 
 #include "document/flow_model_document.h"
-#include "pages/table_form.h"
+#include "forms/table_form.h"
 #include "spatial/data2d.h"
 #include "tests/support/page_driver.h"
 

@@ -1,0 +1,108 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "forms/page.h"
+
+#include <algorithm>
+
+#include <fmt/format.h>
+
+#include "platform/text.h"
+
+namespace tervane {
+
+void CYbSEDlgBase::MakeForm() {
+  form_ = std::make_unique<PageForm>(node_);
+  Describe(*form_);
+  form_->SetDisplayUnits(context_.displayUnits);
+}
+
+void CYbSEDlgBase::Initialize() {
+  MakeForm();
+  SetData();
+}
+
+void CYbSEDlgBase::UpdateDoc(int hint, const std::string& action, const void* source) const {
+  if (context_.updateDoc) context_.updateDoc(hint, action, source);
+}
+
+namespace {
+
+/// A label as the name of an action: "Start Date:" gives "Start Date".
+std::string ActionName(std::string_view label) {
+  std::string name = Replaced(label, "\n", " ");
+  while (!name.empty() && (name.back() == ':' || name.back() == ' ')) name.pop_back();
+  return name;
+}
+
+}  // namespace
+
+std::string CYbSEDlgBase::Enter(Control& control, const std::string& typed) {
+  if (!control.enter || !control.IsEnabled()) return "this value cannot be changed here";
+  if (control.Text() == typed) return {};
+  if (std::string expected = control.enter(typed); !expected.empty()) return expected;
+  Took(control);
+  return {};
+}
+
+void CYbSEDlgBase::Browse(Control& control) {
+  if (control.IsEnabled() && control.browse && control.browse(Outside())) Took(control);
+}
+
+void CYbSEDlgBase::Took(const Control& control) {
+  const int hint = control.hint | (control.then ? control.then() : 0);
+  if (control.revalidates && node_.GetRoot()) node_.GetRoot()->ReValidate();
+  if (control.revalidatesLater) node_.SetRevalidateAll();
+  SetData();
+  UpdateDoc(hint, fmt::format("Change {}", ActionName(control.label.empty() ? control.key : control.label)), &control);
+}
+
+void CYbSEDlgBase::Press(const Control& control) const {
+  if (control.press && control.IsEnabled()) control.press();
+}
+
+std::string CYbSEDlgBase::EnterCell(const Control& table, int row, int column, const std::string& typed) {
+  if (table.table->Cell(row, column) == typed) return {};
+  if (std::string expected = table.table->Enter(row, column, typed); !expected.empty()) return expected;
+  UpdateDoc(kDataChanged,
+            fmt::format("Change {}", ActionName(table.table->Columns()[static_cast<std::size_t>(column - 1)].head)),
+            &table);
+  return {};
+}
+
+bool CYbSEDlgBase::Tell(int hint, const std::string& action) {
+  if (hint == 0) return false;
+  SetData();
+  // Without a source, so that no two operations are undone as one.
+  UpdateDoc(hint, action);
+  return true;
+}
+
+bool CYbSEDlgBase::ChangeRows(const Control& table, RowAction action, int first, int last) {
+  const int rows = first < 1 ? 1 : std::min(last, table.table->RowCount()) - first + 1;
+  const int hint = table.table->ChangeRows(action, first, last);
+  return Tell(hint, table.table->ActionName(action, rows));
+}
+
+bool CYbSEDlgBase::ChangeRow(const Control& table, RowAction action, int row) {
+  return Tell(table.table->ChangeRow(action, row), table.table->ActionName(action, 1));
+}
+
+CellsResult CYbSEDlgBase::Paste(const Control& table, const CellRange& selected, std::string_view text) {
+  CellsResult result = table.table->Paste(selected, text);
+  Tell(result.hint, "Paste");
+  return result;
+}
+
+CellsResult CYbSEDlgBase::FillDown(const Control& table, const CellRange& cells) {
+  CellsResult result = table.table->FillDown(cells);
+  Tell(result.hint, "Fill Down");
+  return result;
+}
+
+CellsResult CYbSEDlgBase::ClearCells(const Control& table, const CellRange& cells) {
+  CellsResult result = table.table->Clear(cells);
+  Tell(result.hint, "Clear");
+  return result;
+}
+
+}  // namespace tervane

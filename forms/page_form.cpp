@@ -1,0 +1,347 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "forms/page_form.h"
+
+#include <array>
+#include <charconv>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include "forms/plots.h"
+#include "forms/table_form.h"
+#include "platform/paths.h"
+#include "platform/text.h"
+
+namespace tervane {
+
+std::string_view KindName(ControlKind kind) {
+  constexpr std::array<std::string_view, 21> names{
+      "check", "radio", "choice", "text", "long text", "integer", "number", "date",  "file",  "label",   "button",
+      "table", "shown", "notice", "view", "text file", "browser", "map",    "chart", "group", "sub-form"};
+  return names[static_cast<std::size_t>(kind)];
+}
+
+int Control::Option() const {
+  const std::string value = Text();
+  int number = -1;
+  const auto result = std::from_chars(value.data(), value.data() + value.size(), number);
+  const bool isOption = result.ec == std::errc() && number >= 0 && number < static_cast<int>(Options().size());
+  return isOption ? number : -1;
+}
+
+namespace {
+
+std::string EnterInt(const std::string& typed, const std::function<void(int)>& set) {
+  int number = 0;
+  std::string expected = EnterValue(number, typed);
+  if (expected.empty()) set(number);
+  return expected;
+}
+
+}  // namespace
+
+PageForm::PageForm(CYbSEKvfBase& node) : node_(node) {
+  std::vector<KeyInfo> described;
+  node.DescribeKeys(described);
+  for (const KeyInfo& key : described) keys_.emplace(key.member, Trimmed(key.key));
+}
+
+Control& PageForm::Add(ControlKind kind, std::string label) {
+  Control& control = *controls_.emplace_back(std::make_unique<Control>());
+  control.kind = kind;
+  control.label = std::move(label);
+  control.node = &node_;
+  return control;
+}
+
+Control& PageForm::AddBound(ControlKind kind, std::string label, const void* member) {
+  Control& control = Add(kind, std::move(label));
+  if (const auto found = keys_.find(member); found != keys_.end()) control.key = found->second;
+  return control;
+}
+
+Control& PageForm::Check(std::string label, int& flag) {
+  Control& control = AddBound(ControlKind::Check, std::move(label), &flag);
+  control.text = [&flag] { return std::string(flag ? "1" : "0"); };
+  control.enter = [&flag](const std::string& typed) {
+    flag = typed == "1";
+    return std::string();
+  };
+  return control;
+}
+
+Control& PageForm::Check(std::string label, bool& flag) {
+  Control& control = AddBound(ControlKind::Check, std::move(label), &flag);
+  control.text = [&flag] { return std::string(flag ? "1" : "0"); };
+  control.enter = [&flag](const std::string& typed) {
+    flag = typed == "1";
+    return std::string();
+  };
+  return control;
+}
+
+Control& PageForm::Radio(std::string label, int& value, std::vector<std::string> options) {
+  Control& control = Choice(std::move(label), value, std::move(options));
+  control.kind = ControlKind::Radio;
+  return control;
+}
+
+Control& PageForm::Choice(std::string label, int& value, std::vector<std::string> options) {
+  Control& control = AddBound(ControlKind::Choice, std::move(label), &value);
+  control.options = [options = std::move(options)] { return options; };
+  control.text = [&value] { return std::to_string(value); };
+  control.enter = [&value](const std::string& typed) { return EnterValue(value, typed); };
+  return control;
+}
+
+Control& PageForm::Choice(std::string label, std::function<int()> get, std::function<void(int)> set,
+                          std::function<std::vector<std::string>()> options) {
+  Control& control = Add(ControlKind::Choice, std::move(label));
+  control.options = std::move(options);
+  control.text = [get = std::move(get)] { return std::to_string(get()); };
+  control.enter = [set = std::move(set)](const std::string& typed) { return EnterInt(typed, set); };
+  return control;
+}
+
+Control& PageForm::Text(std::string label, std::string& value) {
+  Control& control = AddBound(ControlKind::Text, std::move(label), &value);
+  control.text = [&value] { return value; };
+  control.enter = [&value](const std::string& typed) { return EnterValue(value, typed); };
+  return control;
+}
+
+Control& PageForm::Text(std::string label, std::function<std::string()> get,
+                        std::function<void(const std::string&)> set) {
+  Control& control = Add(ControlKind::Text, std::move(label));
+  control.text = std::move(get);
+  control.enter = [set = std::move(set)](const std::string& typed) {
+    std::string value;
+    std::string expected = EnterValue(value, typed);
+    if (expected.empty()) set(value);
+    return expected;
+  };
+  return control;
+}
+
+Control& PageForm::ReadOnlyText(std::string label, std::function<std::string()> get) {
+  Control& control = Add(ControlKind::Text, std::move(label));
+  control.text = std::move(get);
+  return control;
+}
+
+Control& PageForm::LongText(std::string label, std::string& value) {
+  Control& control = Text(std::move(label), value);
+  control.kind = ControlKind::LongText;
+  return control;
+}
+
+Control& PageForm::Integer(std::string label, int& value) {
+  Control& control = AddBound(ControlKind::Integer, std::move(label), &value);
+  control.text = [&value] { return std::to_string(value); };
+  control.enter = [&value](const std::string& typed) { return EnterValue(value, typed); };
+  return control;
+}
+
+Control& PageForm::Integer(std::string label, std::function<int()> get, std::function<void(int)> set) {
+  Control& control = Add(ControlKind::Integer, std::move(label));
+  control.text = [get = std::move(get)] { return std::to_string(get()); };
+  control.enter = [set = std::move(set)](const std::string& typed) { return EnterInt(typed, set); };
+  return control;
+}
+
+template <class Real>
+Control& PageForm::AddNumber(std::string label, Real& value, std::string format) {
+  Control& control = AddBound(ControlKind::Number, std::move(label), &value);
+  control.text = [&value, &control, format = std::move(format)] {
+    return ShownNumber(value, control.NumberUnit(), format);
+  };
+  control.enter = [&value, &control](const std::string& typed) {
+    return EnterNumber(value, typed, control.NumberUnit());
+  };
+  return control;
+}
+
+Control& PageForm::Number(std::string label, float& value, std::string format) {
+  return AddNumber(std::move(label), value, std::move(format));
+}
+
+Control& PageForm::Number(std::string label, double& value, std::string format) {
+  return AddNumber(std::move(label), value, std::move(format));
+}
+
+Control& PageForm::Date(std::string label, CYbDateTime& value) {
+  Control& control = Date(
+      std::move(label), [&value] { return value; }, [&value](const CYbDateTime& date) { value = date; });
+  if (const auto found = keys_.find(&value); found != keys_.end()) control.key = found->second;
+  return control;
+}
+
+Control& PageForm::Date(std::string label, std::function<CYbDateTime()> get,
+                        std::function<void(const CYbDateTime&)> set) {
+  Control& control = Add(ControlKind::Date, std::move(label));
+  control.text = [get = std::move(get)] { return get().Format(kDateFormat); };
+  control.enter = [set = std::move(set)](const std::string& typed) {
+    CYbDateTime date;
+    std::string expected = EnterValue(date, typed);
+    if (expected.empty()) set(date);
+    return expected;
+  };
+  return control;
+}
+
+Control& PageForm::File(std::string label, FileName& value) {
+  Control& control = AddBound(ControlKind::File, std::move(label), &value);
+  control.text = [&value] { return value.Text(); };
+  control.enter = [&value, this](const std::string& typed) { return EnterValue(value, typed, node_); };
+  return control;
+}
+
+Control& PageForm::Label(std::string text) { return Add(ControlKind::Label, std::move(text)); }
+
+Control& PageForm::Button(std::string label, std::function<void()> press) {
+  Control& control = Add(ControlKind::Button, std::move(label));
+  control.press = std::move(press);
+  return control;
+}
+
+Control& PageForm::Choice(std::string label, std::function<int()> get, std::function<void(int)> set,
+                          std::vector<std::string> options) {
+  return Choice(std::move(label), std::move(get), std::move(set), [options = std::move(options)] { return options; });
+}
+
+Control& PageForm::Shown(std::string label, std::function<std::string()> text) {
+  Control& control = Add(ControlKind::Shown, std::move(label));
+  control.text = std::move(text);
+  return control;
+}
+
+Control& PageForm::Notice(std::function<std::string()> text) {
+  Control& control = Add(ControlKind::Notice, {});
+  control.text = std::move(text);
+  return control;
+}
+
+Control& PageForm::TextFile(std::function<std::string()> path) {
+  Control& control = Add(ControlKind::TextFile, {});
+  control.text = std::move(path);
+  return control;
+}
+
+Control& PageForm::TextView(std::string label, std::function<std::string()> text) {
+  Control& control = Add(ControlKind::TextView, std::move(label));
+  control.text = std::move(text);
+  return control;
+}
+
+Control& PageForm::Browser(std::function<std::string()> page) {
+  Control& control = Add(ControlKind::Browser, {});
+  control.text = std::move(page);
+  return control;
+}
+
+Control& PageForm::Table(std::shared_ptr<TableForm> table) {
+  Control& control = Add(ControlKind::Table, {});
+  control.table = std::move(table);
+  return control;
+}
+
+Control& PageForm::Map(std::function<MapContent()> content) {
+  Control& control = Add(ControlKind::Map, {});
+  control.map = std::move(content);
+  return control;
+}
+
+Control& PageForm::Chart(std::function<SeriesContent()> content) {
+  Control& control = Add(ControlKind::Chart, {});
+  control.chart = std::move(content);
+  return control;
+}
+
+PageForm& PageForm::Group(std::string title) {
+  Control& control = Add(ControlKind::Group, std::move(title));
+  control.group = std::make_shared<PageForm>(node_);
+  return *control.group;
+}
+
+PageForm& PageForm::GroupBeside(std::string title) {
+  PageForm& group = Group(std::move(title));
+  controls_.back()->Beside();
+  return group;
+}
+
+Control& PageForm::SubForms(std::vector<std::shared_ptr<PageForm>> forms, std::function<int()> current) {
+  Control& control = Add(ControlKind::SubForms, {});
+  control.subForms = std::move(forms);
+  control.currentSubForm = std::move(current);
+  return control;
+}
+
+void PageForm::ForEach(const std::function<void(Control&)>& visit) {
+  for (const auto& control : controls_) {
+    visit(*control);
+    if (control->group) control->group->ForEach(visit);
+    for (const auto& form : control->subForms) form->ForEach(visit);
+  }
+}
+
+void PageForm::SetDisplayUnits(const DisplayUnits* units) {
+  ForEach([units](Control& control) {
+    control.displayUnits = units;
+    if (control.table) control.table->SetDisplayUnits(units);
+  });
+}
+
+namespace {
+
+std::string ShownValue(const Control& control) {
+  switch (control.kind) {
+    case ControlKind::Check:
+      return control.Text() == "1" ? " on" : " off";
+    case ControlKind::Radio:
+    case ControlKind::Choice: {
+      const std::vector<std::string> options = control.Options();
+      const int chosen = control.Option();
+      // A list without options has nothing to choose.
+      std::string shown = options.empty() ? std::string()
+                          : chosen >= 0   ? options[static_cast<std::size_t>(chosen)]
+                                          : control.Text() + " (not in the list)";
+      return Replaced(fmt::format(" = {} of [{}]", shown, fmt::join(options, " | ")), "\n", " ");
+    }
+    case ControlKind::Map:
+      return " = " + Replaced(Summary(Finished(control.map)), "\n", "\\n");
+    case ControlKind::Chart:
+      return " = " + Replaced(Summary(Finished(control.chart)), "\n", "\\n");
+    case ControlKind::Label:
+    case ControlKind::Button:
+    case ControlKind::Group:
+    case ControlKind::SubForms:
+    case ControlKind::Table:
+      return {};
+    default:
+      return fmt::format(" = {}", Replaced(control.Text(), "\n", "\\n"));
+  }
+}
+
+}  // namespace
+
+std::string FormText(PageForm& form, int level) {
+  std::string text;
+  for (const auto& control : form.Controls()) {
+    const std::string indent(2 * static_cast<std::size_t>(level), ' ');
+    const std::string unit = control->UnitText();
+    text += fmt::format("{}{} \"{}\"{}{}{}{}\n", indent, KindName(control->kind), Replaced(control->label, "\n", " "),
+                        ShownValue(*control), unit.empty() ? "" : " " + unit, control->IsEnabled() ? "" : " disabled",
+                        control->IsShown() ? "" : " hidden");
+    if (control->group) text += FormText(*control->group, level + 1);
+    if (control->table) text += TableText(*control->table, level + 1);
+    if (control->kind == ControlKind::SubForms) {
+      const int current = control->currentSubForm();
+      if (current >= 0 && current < static_cast<int>(control->subForms.size()))
+        text += FormText(*control->subForms[static_cast<std::size_t>(current)], level + 1);
+    }
+  }
+  return text;
+}
+
+}  // namespace tervane

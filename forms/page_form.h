@@ -1,0 +1,218 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What a page shows, without any toolkit: a list of controls, each with a label, a way to read and write its value, and
+// rules that say when it is enabled and shown. A program turns it into widgets, a text, or a test.
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "core/host.h"
+#include "core/node.h"
+#include "forms/entry.h"
+#include "platform/dates.h"
+
+namespace tervane {
+
+class CData2DShpFile;
+class DataFileNode;
+class PageForm;
+class TableForm;
+struct MapContent;
+struct SeriesContent;
+
+/// Bits of a change that views are told of.
+enum UpdateHint : int {
+  kViewOnly = 0,  ///< Only what is shown is another: the document is as it was.
+  kDataChanged = 1,
+  kItemAdded = 2,
+  kItemDeleted = 4,
+  kTreeRebuilt = 8,
+  kOrderChanged = 16,
+  kRefreshPlots = 64,
+};
+
+enum class ControlKind {
+  Check,
+  Radio,   ///< A group of options of which one holds.
+  Choice,  ///< The same as a drop list.
+  Text,
+  LongText,  ///< Several lines.
+  Integer,
+  Number,
+  Date,
+  File,   ///< A file name with a button that browses.
+  Label,  ///< Text alone.
+  Button,
+  Table,
+  Shown,     ///< A value that is only shown.
+  Notice,    ///< A sentence or two that are only read; no place is taken while there is nothing to say.
+  TextView,  ///< A text that is only read.
+  TextFile,  ///< The text of a file, which is read as far as the user looks.
+  Browser,   ///< A page in HTML.
+  Map,       ///< Grids, shapes and points from above.
+  Chart,     ///< Curves over time.
+  Group,     ///< A frame with a title around further controls.
+  SubForms,  ///< A place at which one of several forms stands.
+};
+std::string_view KindName(ControlKind kind);
+
+/// One control. Values travel as text, in the form in which they are shown and typed; options as their number.
+class Control {
+ public:
+  ControlKind kind = ControlKind::Label;
+  std::string label;
+  std::string toolTip;
+  std::string unit;                                   ///< A fixed unit; `UnitText` tells what is shown.
+  int itemType = 0;                                   ///< The number is a quantity of that item type; 0 for none.
+  const DisplayUnits* displayUnits = nullptr;         ///< The user's units; null for base units.
+  std::function<std::vector<std::string>()> options;  ///< Of a radio group or drop list.
+  std::string key;                                    ///< Of the node, so that a finding leads here.
+  const CYbSEKvfBase* node = nullptr;
+  Host::FileQuestion fileQuestion;    ///< Of a file name.
+  std::string folder;                 ///< Of a page of a browser: where what it names lies.
+  std::function<std::string()> text;  ///< The value as shown; of a check "1" or "0", of options the number from 0.
+  /// Takes a typed value; gives what was expected when it is none, and then changes nothing.
+  std::function<std::string(const std::string&)> enter;
+  std::function<void()> press;  ///< Of a button.
+  /// Of a file: asks for one and what is chosen in it. False when the user gave up.
+  std::function<bool(Host&)> browse;
+  /// What a taken value brings with it; gives further hints of the change.
+  std::function<int()> then;
+  std::function<bool()> enabledWhen, shownWhen;
+  bool beside = false;  ///< Stands in the same row as the control before it.
+  int hint = kDataChanged;
+  bool revalidates = false;         ///< Other nodes' rules depend on the value.
+  bool revalidatesLater = false;    ///< The same, at the next update of the views.
+  std::shared_ptr<PageForm> group;  ///< The controls of a group.
+  std::vector<std::shared_ptr<PageForm>> subForms;
+  std::function<int()> currentSubForm;  ///< Which one is shown.
+  std::shared_ptr<TableForm> table;
+  std::function<MapContent()> map;       ///< What a map shows now.
+  std::function<SeriesContent()> chart;  ///< What a chart shows now.
+
+  bool IsEnabled() const { return !enabledWhen || enabledWhen(); }
+  bool IsShown() const { return !shownWhen || shownWhen(); }
+  std::string Text() const { return text ? text() : std::string(); }
+  std::vector<std::string> Options() const { return options ? options() : std::vector<std::string>(); }
+  FieldUnit NumberUnit() const { return {unit, itemType, displayUnits}; }
+  /// The unit behind the value, as the user's choice is now; empty for none.
+  std::string UnitText() const { return itemType ? NumberUnit().Text() : unit; }
+  /// The units that a user may choose to see the quantity in; empty where there is nothing to choose.
+  std::vector<UnitChoice> UnitChoices() const { return NumberUnit().Choices(); }
+  /// The number of the chosen option, or -1 when the value is none of them.
+  int Option() const;
+
+  // ---- Said behind the making of a control
+
+  Control& EnabledWhen(std::function<bool()> rule) { return enabledWhen = std::move(rule), *this; }
+  Control& ShownWhen(std::function<bool()> rule) { return shownWhen = std::move(rule), *this; }
+  Control& Unit(std::string text_) { return unit = std::move(text_), *this; }
+  /// The node stores the base unit of that item type; the number is shown and typed in the user's unit.
+  Control& Quantity(int itemType_) { return itemType = itemType_, *this; }
+  Control& Beside() { return beside = true, *this; }
+  Control& Key(std::string name) { return key = std::move(name), *this; }
+  Control& Folder(std::string path) { return folder = std::move(path), *this; }
+  Control& ToolTip(std::string text_) { return toolTip = std::move(text_), *this; }
+  Control& Revalidates() { return revalidates = true, *this; }
+  Control& RevalidatesLater() { return revalidatesLater = true, *this; }
+  Control& Hint(int hint_) { return hint = hint_, *this; }
+  Control& Then(std::function<int()> then_) { return then = std::move(then_), *this; }
+  Control& Filter(std::string filter) { return fileQuestion.filter = std::move(filter), *this; }
+  Control& DefaultExtension(std::string extension) {
+    return fileQuestion.defaultExtension = std::move(extension), *this;
+  }
+};
+
+/// The controls of a page, a group or a sub-form, in the order in which they stand and are reached by the keyboard.
+class PageForm {
+ public:
+  explicit PageForm(CYbSEKvfBase& node);
+
+  /// A flag of the node, 0 or 1.
+  Control& Check(std::string label, int& flag);
+  Control& Check(std::string label, bool& flag);
+  Control& Radio(std::string label, int& value, std::vector<std::string> options);
+  Control& Choice(std::string label, int& value, std::vector<std::string> options);
+  /// The same for a value that is not a member.
+  Control& Choice(std::string label, std::function<int()> get, std::function<void(int)> set,
+                  std::vector<std::string> options);
+  /// The same with options that change.
+  Control& Choice(std::string label, std::function<int()> get, std::function<void(int)> set,
+                  std::function<std::vector<std::string>()> options);
+  Control& Text(std::string label, std::string& value);
+  Control& Text(std::string label, std::function<std::string()> get, std::function<void(const std::string&)> set);
+  /// A text to read, select and copy in its field, with its end in view: the name of a file.
+  Control& ReadOnlyText(std::string label, std::function<std::string()> get);
+  Control& LongText(std::string label, std::string& value);
+  Control& Integer(std::string label, int& value);
+  Control& Integer(std::string label, std::function<int()> get, std::function<void(int)> set);
+  /// A number as it is stored, unless `Quantity` is said behind it. `format` is a printf format of one double, such as
+  /// "%.1e"; empty for the shortest form.
+  Control& Number(std::string label, float& value, std::string format = {});
+  Control& Number(std::string label, double& value, std::string format = {});
+  Control& Date(std::string label, CYbDateTime& value);
+  Control& Date(std::string label, std::function<CYbDateTime()> get, std::function<void(const CYbDateTime&)> set);
+  Control& File(std::string label, FileName& value);
+  /// A data file with the item that is chosen in it, by the request of its node.
+  Control& DataFile(std::string label, DataFileNode& file);
+  /// A shape file with the attribute that is chosen in it.
+  Control& ShapeFile(std::string label, CData2DShpFile& file);
+  Control& Label(std::string text);
+  Control& Button(std::string label, std::function<void()> press);
+  Control& Notice(std::function<std::string()> text);
+  Control& TextView(std::string label, std::function<std::string()> text);
+  /// The text of the file at a path.
+  Control& TextFile(std::function<std::string()> path);
+  Control& Browser(std::function<std::string()> page);
+  /// A value that is only shown.
+  Control& Shown(std::string label, std::function<std::string()> text);
+  Control& Table(std::shared_ptr<TableForm> table);
+  /// What it shows is asked for anew whenever the page is brought in step with its node, so it must be at hand: grids
+  /// and shapes are shared, not made for each call, and what is not there yet is awaited.
+  Control& Map(std::function<MapContent()> content);
+  /// The same for a chart.
+  Control& Chart(std::function<SeriesContent()> content);
+  /// A frame with a title; the controls are added to the form that it holds.
+  PageForm& Group(std::string title);
+  /// The same, in one row with the group before it.
+  PageForm& GroupBeside(std::string title);
+  Control& SubForms(std::vector<std::shared_ptr<PageForm>> forms, std::function<int()> current);
+
+  CYbSEKvfBase& Node() const { return node_; }
+  const std::vector<std::unique_ptr<Control>>& Controls() const { return controls_; }
+  std::vector<std::unique_ptr<Control>>& Controls() { return controls_; }
+
+  /// Calls `visit` for all controls, also of groups and sub-forms.
+  void ForEach(const std::function<void(Control&)>& visit);
+
+  /// Shows and takes quantities in these units from now on, also in groups, sub-forms and tables; they are asked each
+  /// time and must outlive the form. Null for base units.
+  void SetDisplayUnits(const DisplayUnits* units);
+
+  /// How dates are shown and typed.
+  static constexpr std::string_view kDateFormat = "%Y/%m/%d  %H:%M";
+
+ private:
+  Control& Add(ControlKind kind, std::string label);
+  /// A control of the key that is bound to this member.
+  Control& AddBound(ControlKind kind, std::string label, const void* member);
+  template <class Real>
+  Control& AddNumber(std::string label, Real& value, std::string format);
+
+  CYbSEKvfBase& node_;
+  std::vector<std::unique_ptr<Control>> controls_;
+  std::unordered_map<const void*, std::string>
+      keys_;  ///< Members of the node and the keys under which they are stored.
+};
+
+/// A form as text, one line for each control in the order of the page: kind, label in double quotes, value, unit, and
+/// `disabled` or `hidden` where it is so.
+std::string FormText(PageForm& form, int level = 0);
+
+}  // namespace tervane

@@ -1,0 +1,215 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "overlays/overlays.h"
+
+#include <array>
+
+#include <fmt/format.h>
+
+#include "overlays/pages.h"
+#include "platform/paths.h"
+#include "platform/units.h"
+
+namespace tervane {
+
+namespace {
+
+/// A name that ends in a separator names no file.
+void FileKey(KeyExchange& keys, const char* key, FileName& file) {
+  keys(key, file);
+  if (keys.IsReading() && EndsInSeparator(file.Text())) file = FileName();
+}
+
+void ColorKeys(KeyExchange& keys, const std::string& key, OverlayColor& color) {
+  keys(key + "R", color.r);
+  keys(key + "G", color.g);
+  keys(key + "B", color.b);
+}
+
+struct KindText {
+  const char* name;
+  const char* title;
+};
+constexpr std::array kKinds{KindText{"Image", "Image Overlay"}, KindText{"Grid", "Grid Overlay"},
+                            KindText{"Shape", "Shape Overlay"}, KindText{"River", "River Overlay"},
+                            KindText{"Well", "Well Overlay"}};
+
+const KindText* KindOf(int type) {
+  return type >= 1 && type <= static_cast<int>(kKinds.size()) ? &kKinds[static_cast<std::size_t>(type - 1)] : nullptr;
+}
+
+}  // namespace
+
+// ---- Kinds
+
+void COverlayBMPKvf::ExchangeKeys(KeyExchange& keys) {
+  FileKey(keys, "Filename", Filename);
+  keys("BMP_X0", BMP_X0);
+  keys("BMP_X1", BMP_X1);
+  keys("BMP_Y0", BMP_Y0);
+  keys("BMP_Y1", BMP_Y1);
+  keys("BMP_TransparentColor", BMP_TransparentColor);
+  keys("BMP_DisplayStyle", BMP_DisplayStyle);
+  keys("Display", Display);
+}
+
+COverlayGridKvf::COverlayGridKvf(CYbSEKvfBase* parent)
+    : OverlayLayer("OverlayGrid", "OverlayGrid", parent), file_(NewChild<CTvnData2DNdsFile>()) {
+  file_->SetFileUsed(0);
+  file_->SetDomainCheck(0);
+}
+
+void COverlayGridKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("Transparency", Transparency);
+  keys("Display", Display);
+}
+
+int COverlayGridKvf::ValidateData() {
+  const auto* item = dynamic_cast<const COverlayItemKvf*>(GetParent());
+  file_->SetFileUsed(item && item->Type == COverlayItemKvf::kGrid);
+  return 1;
+}
+
+COverlayShapeKvf::COverlayShapeKvf(CYbSEKvfBase* parent)
+    : OverlayLayer("Shape overlay", "OverlayShape", parent),
+      ShapeAxisUnit(BaseUnit(*FindItemType(kCoordinateItemType)).key) {}
+
+void COverlayShapeKvf::ExchangeKeys(KeyExchange& keys) {
+  FileKey(keys, "Filename", Filename);
+  keys("ItemDescr", ItemDescr);
+  keys("ShapeAxisUnit", ShapeAxisUnit);
+  keys("PointSize", PointSize);
+  keys("PointStyle", PointStyle);
+  keys("PointType", PointType);
+  ColorKeys(keys, "PointColor", PointColor);
+  ColorKeys(keys, "PointTextColor", PointTextColor);
+  keys("LineThickness", LineThickness);
+  keys("LineStyle", LineStyle);
+  keys("PolygonStyle", PolygonStyle);
+  ColorKeys(keys, "LineColor", LineColor);
+  ColorKeys(keys, "LineTextColor", LineTextColor);
+  keys("LineTextColorOption", LineTextColorOption);
+  keys("ShowLineText", ShowLineText);
+  keys("PointTextBackground", PointTextBackground);
+  keys("LineTextBackground", LineTextBackground);
+  keys("PointTextColorOption", PointTextColorOption);
+  keys("ShowPointText", ShowPointText);
+  keys("Display", Display);
+}
+
+void COverlayRiverKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("SourceFvrNwkType", SourceFvrNwkType);
+  FileKey(keys, "FvrNwkFilename_Specified", FvrNwkFilename_Specified);
+  keys("Display", Display);
+}
+
+void COverlayWellKvf::ExchangeKeys(KeyExchange& keys) {
+  FileKey(keys, "WellFilename", WellFilename);
+  keys("Display", Display);
+  keys("Lables", Lables);
+  keys("SourceWellType", SourceWellType);
+}
+
+// ---- Layers
+
+COverlayItemKvf::COverlayItemKvf(CYbSEKvfBase* parent) : CTvnKvfBase("OverlayItem", "OverlayItem_%d", parent) {
+  NewChild<COverlayBMPKvf>();
+  NewChild<COverlayGridKvf>();
+  NewChild<COverlayShapeKvf>();
+  NewChild<COverlayRiverKvf>();
+  NewChild<COverlayWellKvf>();
+}
+
+OverlayLayer* COverlayItemKvf::Layer() const {
+  return KindOf(Type) ? dynamic_cast<OverlayLayer*>(GetChild(Type)) : nullptr;
+}
+
+std::string COverlayItemKvf::KindTitle() const {
+  const KindText* kind = KindOf(Type);
+  return kind ? kind->title : "";
+}
+
+const std::string& COverlayItemKvf::GetAbbreviatedTitle() const {
+  const KindText* kind = KindOf(Type);
+  const OverlayLayer* layer = Layer();
+  shownTitle_.clear();
+  if (kind && layer) {
+    const std::string& path = layer->LayerFile().Text();
+    const std::string name = fmt::format("{}{}", BaseNameOf(path), ExtensionOf(path));
+    shownTitle_ =
+        fmt::format("{}{}: {}", layer->Display ? "" : "Disabled ", kind->name, path.empty() ? "Unknown" : name);
+  }
+  return shownTitle_;
+}
+
+COverlayCurrentLayerGridKvf::COverlayCurrentLayerGridKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Grid", "Grid", parent) {
+  if (GetRoot()) GetRoot()->RegisterImportantNode(this, "OVERLAY_CURRENT_LAYER_GRID");
+}
+
+void COverlayCurrentLayerGridKvf::ExchangeKeys(KeyExchange& keys) {
+  // Once there were five steps.
+  constexpr std::array kSteps{0.19F, 0.25F, 0.38F, 0.5F, 0.62F};
+  int step = -1;
+  keys.ReadOnly("Transparency", step);
+  if (keys.Section() && step >= 0 && step < static_cast<int>(kSteps.size()))
+    TransparencyVal = kSteps[static_cast<std::size_t>(step)];
+  keys("TransparencyVal", TransparencyVal);
+}
+
+COverlayCurrentLayerKvf::COverlayCurrentLayerKvf(CYbSEKvfBase* parent)
+    : CYbSEKvfGroupBase("Current Layer", "Current_Layer", parent) {
+  NewChild<COverlayCurrentLayerGridKvf>();
+}
+
+// ---- All of them
+
+COverlaysKvf::COverlaysKvf(CYbSEKvfBase* parent)
+    : CTvnKvfGroupBase("Display", "Overlays", parent),
+      foreground_(NewChild<COverlayListKvf>("Foreground")),
+      background_(NewChild<COverlayListKvf>("Background")) {
+  NewChild<COverlayCurrentLayerKvf>();
+  SetPage(kDisplayPage);
+  if (!GetRoot()) return;
+  GetRoot()->RegisterImportantNode(foreground_, "FOREGROUND_OVERLAY_DATA");
+  GetRoot()->RegisterImportantNode(background_, "BACKGROUND_OVERLAY_DATA");
+}
+
+void COverlaysKvf::ExchangeState(KeyExchange& keys) {
+  CTvnKvfGroupBase::ExchangeState(keys);
+  for (double* corner : {&x0, &y0, &x1, &y1}) keys("corner", *corner);
+}
+
+float COverlaysKvf::CurrentTransparency() const {
+  const auto* grid = Important<COverlayCurrentLayerGridKvf>("OVERLAY_CURRENT_LAYER_GRID");
+  return grid ? grid->TransparencyVal : 0.5F;
+}
+
+void COverlaysKvf::SetArea(const DataArea& area) {
+  x0 = area.x0;
+  y0 = area.y0;
+  x1 = area.x1;
+  y1 = area.y1;
+  if (auto* root = dynamic_cast<CTvnKvfGlobalBase*>(GetRoot()))
+    if (root->SetMaxDataArea(area)) root->SetDefaultDataArea(area);
+}
+
+void COverlaysKvf::AdoptDomain(const Envelope& domain) {
+  if (UseModelDomain) SetArea({domain.xMin, domain.yMin, domain.xMax, domain.yMax});
+}
+
+int COverlaysKvf::ValidateData() {
+  auto* root = dynamic_cast<CTvnKvfGlobalBase*>(GetRoot());
+  if (const auto* domain = Important<CCatchmentKvf>("CATCHMENT")) AdoptDomain(domain->GetEnvelope());
+  if (!root) return 1;
+  int isUndefined = 0;
+  root->IsUndefined(isUndefined);
+  if (UseModelDomain && isUndefined) root->SetDefaultDataArea({x0, y0, x1, y1});
+  const DataArea& area = root->GetMaxDataArea();
+  x0 = area.x0;
+  y0 = area.y0;
+  x1 = area.x1;
+  y1 = area.y1;
+  return 1;
+}
+
+}  // namespace tervane

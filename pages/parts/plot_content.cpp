@@ -1,0 +1,326 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/parts/plot_content.h"
+
+#include <algorithm>
+#include <cmath>
+#include <deque>
+#include <limits>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include "overlays/grid_state.h"
+#include "overlays/overlays.h"
+#include "platform/paths.h"
+#include "simspec/periods.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr std::size_t kMostValues = 2'000'000;
+
+/// What was read from files lately, shared by all pages: asked for at every change of a page, read once.
+template <class Key, class Data>
+class RecentFiles {
+ public:
+  using Result = std::shared_ptr<Computed<Data>>;
+
+  template <class Maker>
+  Result Get(Key key, const std::string& path, Maker maker) {
+    const auto found = std::ranges::find(entries_, key, &Entry::key);
+    if (found != entries_.end()) {
+      std::rotate(entries_.begin(), found, found + 1);
+      return entries_.front().result;
+    }
+    auto result = std::make_shared<Computed<Data>>(fmt::format("Reading {}", FileNameOf(path)), std::move(maker));
+    entries_.push_front({std::move(key), result});
+    LetGo();
+    return result;
+  }
+
+ private:
+  struct Entry {
+    Key key;
+    Result result;
+
+    /// Somebody shows it, or waits for it.
+    bool IsInUse() const {
+      return result.use_count() > 1 || (result->IsDone() && result->Result() && result->Result().use_count() > 1);
+    }
+  };
+
+  /// Forgets what has not been asked for for the longest time. What is in use needs its memory anyway, and a map of
+  /// many files would never be complete if they drove each other out.
+  void LetGo() {
+    std::size_t count = 0;
+    std::erase_if(entries_, [&](const Entry& entry) { return !entry.IsInUse() && ++count > kMostFiles; });
+  }
+
+  static constexpr std::size_t kMostFiles = 8;
+  std::deque<Entry> entries_;
+};
+
+/// The values of an item over all times.
+FileResult ReadSeries(const std::string& path, int number, Series& series, ProgressPart progress) {
+  DataFile file;
+  const auto refused = [](std::string reason) { return FileResult{std::move(reason), {}}; };
+  if (std::string problem = file.Open(path); !problem.empty()) return refused(std::move(problem));
+  if (number < 1 || number > static_cast<int>(file.Items().size()))
+    return refused(fmt::format("there is no item {}: the file has {}", number, file.Items().size()));
+  const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)];
+  if (item.dimensions != 0 || !file.Time().hasDates) return refused("It is no time series.");
+  if (file.Time().steps > kMostValues)
+    return refused(fmt::format("It has {} steps, too many to be shown.", file.Time().steps));
+  std::vector<float> values(file.Time().steps);
+  if (std::string problem = file.Read({number, 0, values.size(), {}}, values, {}, progress); !problem.empty())
+    return refused(std::move(problem));
+  series.name = item.name;
+  series.unit = ShortUnitOf(item);
+  series.isStepped = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
+  for (std::size_t step = 0; step < values.size(); ++step) {
+    series.times.push_back(file.Time().Stamp(step));
+    series.values.push_back(values[step] == kDeleteValue ? std::numeric_limits<double>::quiet_NaN()
+                                                         : static_cast<double>(values[step]));
+  }
+  return {};
+}
+
+struct FileKey {
+  std::string path;
+  std::vector<FileStamp> stamps;
+  int item = 0;           ///< Or the unit of coordinates.
+  std::string attribute;  ///< Of a shape file.
+  GridSlice slice;
+
+  bool operator==(const FileKey&) const = default;
+};
+
+std::shared_ptr<ComputedGrid> RecentGrid(const std::string& path, int item, const GridSlice& slice = {}) {
+  static RecentFiles<FileKey, CTvn2DOrthoRotatedGridData> grids;
+  return grids.Get({path, {StampOf(path)}, item, {}, slice}, path,
+                   [path, item, slice](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
+                     return ReadGridData(path, item, grid, progress, slice);
+                   });
+}
+
+std::shared_ptr<Computed<CTvnShapeData>> RecentShapes(const std::string& path, const std::string& attribute,
+                                                      int axisUnit) {
+  static RecentFiles<FileKey, CTvnShapeData> files;
+  return files.Get({path, StampsOfShape(path), axisUnit, attribute, {}}, path,
+                   [path, attribute, axisUnit](CTvnShapeData& shapes, ProgressPart progress) {
+                     shapes.SetAxisLengthUnit(axisUnit);
+                     return attribute.empty() ? shapes.ReadShapeFile(path, progress)
+                                              : shapes.ReadShapeAndDbfFile(path, attribute, progress);
+                   });
+}
+
+std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item) {
+  static RecentFiles<FileKey, Series> files;
+  return files.Get({path, {StampOf(path)}, item, {}, {}}, path, [path, item](Series& series, ProgressPart progress) {
+    return ReadSeries(path, item, series, progress);
+  });
+}
+
+const COverlaysKvf* OverlaysOf(const CYbSEKvfBase& node) { return node.Important<COverlaysKvf>("OVERLAY_DATA"); }
+
+/// Grids and shapes of a list of layers that are shown.
+void AddLayers(const COverlayListKvf& list, MapContent& map) {
+  for (int number = 1; number <= list.GetItemCount(); ++number) {
+    const COverlayItemKvf& item = *list.GetItem(number);
+    const OverlayLayer* layer = item.Layer();
+    if (!layer || !layer->Display || layer->LayerFile().IsEmpty()) continue;
+    if (const auto* grid = dynamic_cast<const COverlayGridKvf*>(layer)) {
+      GridLayer drawn;
+      drawn.grid = NowOrAwaited(RecentGrid(grid->LayerFile().Absolute(), grid->GridFile().SelectedItem()), map.awaited);
+      if (!drawn.grid) continue;
+      drawn.withLegend = false;
+      drawn.transparency = std::min(1.0, static_cast<double>(grid->Transparency));
+      map.grids.push_back(std::move(drawn));
+    } else if (const auto* shape = dynamic_cast<const COverlayShapeKvf*>(layer)) {
+      if (auto data = NowOrAwaited(RecentShapes(shape->LayerFile().Absolute(), {}, shape->ShapeAxisUnit), map.awaited))
+        map.shapes.push_back({std::move(data), {}});
+    }
+  }
+}
+
+}  // namespace
+
+MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid,
+                   const std::string& problem) {
+  MapContent map;
+  map.message = problem;
+  if (!grid) return map;
+  const COverlaysKvf* overlays = OverlaysOf(node);
+  if (overlays) AddLayers(overlays->Background(), map);
+  GridLayer layer;
+  layer.isCodes = grid->ItemType() == kCodeItemType;
+  layer.grid = std::move(grid);
+  if (!map.grids.empty() && overlays) layer.transparency = static_cast<double>(overlays->CurrentTransparency());
+  // The data come first for what a user points at, whatever lies below them.
+  map.grids.insert(map.grids.begin(), std::move(layer));
+  if (overlays) AddLayers(overlays->Foreground(), map);
+  return map;
+}
+
+MapContent GridMap(const CYbSEKvfBase& node, const std::shared_ptr<ComputedGrid>& grid) {
+  if (!grid) return GridMap(node, nullptr, std::string());
+  if (grid->IsDone()) return GridMap(node, grid->Result(), grid->Problem());
+  MapContent map;
+  map.awaited.push_back(grid);
+  return map;
+}
+
+MapContent GridFileMap(const CYbSEKvfBase& node, const std::string& path, int item, const GridSlice& slice) {
+  return GridMap(node, RecentGrid(path, item, slice));
+}
+
+MapContent FileMap(const DataFileNode& file, const GridSlice& slice) {
+  if (file.File.IsEmpty()) return GridMap(file, nullptr, "No file is chosen.");
+  return GridFileMap(file, file.File.Absolute(), file.SelectedItem(), slice);
+}
+
+MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit) {
+  MapContent map;
+  if (file.File.IsEmpty()) {
+    map.message = "No file is chosen.";
+    return map;
+  }
+  const auto shapes = RecentShapes(file.File.Absolute(), file.Attribute(), axisUnit);
+  if (auto data = NowOrAwaited(shapes, map.awaited))
+    map.shapes.push_back({std::move(data), {}});
+  else if (shapes->IsDone())
+    map.message = shapes->Problem();
+  return map;
+}
+
+SeriesContent FileChart(const DataFileNode& node) {
+  SeriesContent chart;
+  if (node.File.IsEmpty()) {
+    chart.message = "No file is chosen.";
+    return chart;
+  }
+  if (const auto* period = node.Important<CSimPeriodKvf>("SIMPERIOD"))
+    chart.period = {period->GetSimStartDate(), period->SIMEND};
+  const auto series = RecentSeries(node.File.Absolute(), node.SelectedItem());
+  if (const auto data = NowOrAwaited(series, chart.awaited))
+    chart.series.push_back(*data);
+  else if (series->IsDone())
+    chart.message = series->Problem();
+  return chart;
+}
+
+std::string ShortUnitOf(const DataItem& item) {
+  const Unit* unit = FindUnit(item.unitKey);
+  return unit ? std::string(unit->abbreviation) : item.unitText;
+}
+
+Control& UnitKeyChoice(PageForm& form, const std::string& label, const char* key, int& unitKey, int itemType) {
+  const ItemType* type = FindItemType(itemType);
+  std::vector<int> keys;
+  std::vector<std::string> texts;
+  for (const int unit : type ? type->unitKeys : std::span<const int>()) {
+    keys.push_back(unit);
+    texts.emplace_back(FindUnit(unit)->text);
+  }
+  return form
+      .Choice(
+          label,
+          [&unitKey, keys] {
+            const auto found = std::ranges::find(keys, unitKey);
+            return found == keys.end() ? unitKey : static_cast<int>(found - keys.begin());
+          },
+          [&unitKey, keys](int choice) {
+            if (choice >= 0 && choice < static_cast<int>(keys.size())) unitKey = keys[static_cast<std::size_t>(choice)];
+          },
+          std::move(texts))
+      .Key(key);
+}
+
+Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& owner) {
+  return form
+      .Choice(
+          "Fill Gaps with:",
+          [&filler, &owner] {
+            const std::vector<std::string> names = ZoneItemTitles(owner);
+            return static_cast<int>(std::ranges::find(names, filler) - names.begin());
+          },
+          [&filler, &owner](int choice) {
+            const std::vector<std::string> names = ZoneItemTitles(owner);
+            if (choice >= 0 && choice < static_cast<int>(names.size()))
+              filler = names[static_cast<std::size_t>(choice)];
+          },
+          [&filler, &owner] {
+            std::vector<std::string> options = ZoneItemTitles(owner);
+            // A name that nobody bears stands behind the others until another one is chosen.
+            if (std::ranges::find(options, filler) == options.end())
+              options.push_back(filler.empty() ? filler : filler + " (not in the list)");
+            return options;
+          })
+      .Key("ShapeGapFillName");
+}
+
+void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner) {
+  const std::vector<std::string> names = ZoneItemTitles(owner);
+  if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
+}
+
+FoundZones FindWatched(Host& host, const ZoneFinder& finder) {
+  const auto finding =
+      std::make_shared<Computed<FoundZones>>("Looking for zones", [finder](FoundZones& found, ProgressPart progress) {
+        found = finder(progress);
+        return FileResult{progress.IsCancelled() ? kCancelled : "", {}};
+      });
+  if (host.Compute(finding) && finding->Result()) return *finding->Result();
+  FoundZones none;
+  none.unreadable = finding->IsDone() ? finding->Problem() : "The file was not read to its end.";
+  return none;
+}
+
+int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const std::function<SyncResult()>& sync) {
+  if (!found.unreadable.empty()) {
+    host.Tell(fmt::format("{}\n\nThe zones stay as they are.", found.unreadable), Host::Icon::Warning);
+    return kDataChanged;
+  }
+  if (!found.message.empty()) {
+    host.Tell(found.message, Host::Icon::Warning);
+    return kDataChanged;
+  }
+  if (!plan.editedRemoved.empty()) {
+    std::vector<std::string> names;
+    for (const CFMSEKvfGroupBase* zone : plan.editedRemoved) names.push_back(zone->GetStationName());
+    const std::string question = fmt::format(
+        "These hold values of yours and would be removed:\n\n{}\n\nRemove them? With No all stay as they are.",
+        fmt::join(names, "\n"));
+    if (host.Ask(question, Host::Icon::Question, Host::Buttons::YesNo) != Host::Answer::Yes) return kDataChanged;
+  }
+  switch (sync()) {
+    case kAdded:
+      return kItemAdded | kOrderChanged;
+    case kRemoved:
+      return kItemDeleted | kOrderChanged;
+    case kAddedAndRemoved:
+      return kItemDeleted | kItemAdded | kOrderChanged;
+    case kReordered:
+      return kOrderChanged;
+    case kNothing:
+      break;
+  }
+  return kDataChanged;
+}
+
+void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const FileName& file, std::optional<int> item) {
+  if (const COverlaysKvf* overlays = OverlaysOf(node)) {
+    if (PrepareGridState(*overlays, file, item, context.host).empty()) return;
+  }
+  if (context.openDataFile) context.openDataFile(file.Absolute());
+}
+
+bool MayCreateFile(const PageContext& context) {
+  if (!context.document.PathName().empty()) return true;
+  context.host.Tell("You must save your setup before you can create a file.", Host::Icon::Warning);
+  return false;
+}
+
+}  // namespace tervane

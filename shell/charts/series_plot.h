@@ -1,0 +1,71 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <QString>
+#include <memory>
+#include <optional>
+#include <vector>
+
+#include "forms/plots.h"
+#include "shell/widgets/plot_frame.h"
+
+class QCPAxis;
+class QCPGraph;
+class QCPItemStraightLine;
+class QCPItemRect;
+class QCustomPlot;
+class QLabel;
+class QMouseEvent;
+
+namespace tervane {
+
+/// A chart of a page: curves over time with their legend.
+///
+/// The wheel zooms in time towards the pointer (with Ctrl in the values), drag moves, Shift and drag zooms to a box, a
+/// double click or Home shows everything; + - and the arrows do the same from the keyboard.
+class SeriesPlot : public PlotFrame {
+  Q_OBJECT
+
+ public:
+  explicit SeriesPlot(Host& host, QWidget* parent = nullptr);
+  ~SeriesPlot() override;
+
+  /// Shows what there is to show; draws anew only where something differs.
+  void Show(SeriesContent content);
+  /// The same of content that may have to be computed: what is shown stays until that is done.
+  void ShowWhenThere(const std::function<SeriesContent()>& content);
+  QCustomPlot& Chart() const { return *chart_; }
+  QWidget* FocusTarget() const;
+  /// The values of all series that the user sees at a time, in seconds since 1970.
+  QString TextAt(double time) const;
+  /// The values as a table of texts, one row for each time, as a spreadsheet takes them.
+  QString ValuesAsText() const;
+  void Fit();
+  void Zoom(double factor);
+
+ protected:
+  bool eventFilter(QObject* watched, QEvent* event) override;
+
+ private:
+  struct Curve;
+
+  void Build();
+  void AddCurve(const Series& series, QCPAxis* values);
+  void ApplyTheme();
+  /// As many columns of names and ticks as there is room for.
+  void Arrange();
+  void PointAt(const QMouseEvent* event);
+  bool Press(int key);
+  QImage Picture(double pixelRatio);
+
+  SeriesContent content_;
+  bool isShown_ = false;
+  QCustomPlot* chart_;
+  QLabel* message_;
+  std::vector<Curve> curves_;
+  QCPItemRect* period_ = nullptr;
+  QCPItemStraightLine* pointer_ = nullptr;
+};
+
+}  // namespace tervane

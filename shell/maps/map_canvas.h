@@ -1,0 +1,103 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <QPixmap>
+#include <QWidget>
+#include <atomic>
+#include <memory>
+#include <optional>
+#include <vector>
+
+#include "forms/plots.h"
+#include "shell/maps/map_rendering.h"
+
+namespace tervane {
+
+/// The map itself: its layers in a frame, with legend, north arrow and scale bar; moved by mouse and keyboard.
+class MapCanvas : public QWidget {
+  Q_OBJECT
+
+ public:
+  explicit MapCanvas(QWidget* parent = nullptr);
+  ~MapCanvas() override;
+
+  /// Shows another content; the part that is seen stays where the whole area is the same as before. Large grids are
+  /// made ready in another thread, and appear when they are.
+  void SetContent(MapContent content, const DisplayUnits* units);
+  const MapContent& Content() const { return content_; }
+  void SetPicked(std::function<void(const MapPick&)> picked) { content_.picked = std::move(picked); }
+
+  /// The part of the map that is seen, in the canvas's own coordinates.
+  const MapWindow& Window() const { return window_; }
+  /// What the user reads of a place: coordinates, cell, value, shape.
+  QString TextAt(MapPoint place) const;
+  QString Summary() const;
+  void Fit();
+  /// Shows more (above 1) or less; the place at that point of the screen stays there.
+  void Zoom(double factor, QPointF around);
+  void Zoom(double factor) { Zoom(factor, window_.rect.center()); }
+  void Pan(QPointF by);
+  bool IsPreparing() const;
+  /// Waits until all grids are ready.
+  void WaitUntilReady();
+  /// The map as it is seen, with more pixels for paper.
+  QImage Picture(double pixelRatio);
+
+  QSize sizeHint() const override { return {640, 480}; }
+
+ signals:
+  /// The pointer is at another place; nothing when it has left the map.
+  void PointedAt(const QString& text);
+
+ protected:
+  void paintEvent(QPaintEvent* event) override;
+  void resizeEvent(QResizeEvent* event) override;
+  void changeEvent(QEvent* event) override;
+  void mousePressEvent(QMouseEvent* event) override;
+  void mouseMoveEvent(QMouseEvent* event) override;
+  void mouseReleaseEvent(QMouseEvent* event) override;
+  void mouseDoubleClickEvent(QMouseEvent* event) override;
+  void wheelEvent(QWheelEvent* event) override;
+  void keyPressEvent(QKeyEvent* event) override;
+  void leaveEvent(QEvent* event) override;
+
+ private:
+  struct Layer;  ///< A grid and its picture, which may still be in the making.
+  enum class Gesture { None, Press, Pan, Box };
+
+  void Prepare(Layer& layer);
+  std::optional<Envelope> WholeArea() const;
+  void Arrange();
+  void Redraw();
+  void Render(QPainter& painter, double pixelRatio);
+  void DrawLegends(QPainter& painter);
+  double DrawLegend(QPainter& painter, const Layer& layer, QRectF place);
+  void DrawFrame(QPainter& painter);
+  QRectF NorthArrowPlace() const;
+  void DrawNorthArrow(QPainter& painter);
+  /// The length that the scale bar shows, with its texts and its place.
+  struct ScaleBar;
+  ScaleBar MakeScaleBar() const;
+  void DrawScaleBar(QPainter& painter, const ScaleBar& scale);
+  double LegendWidth() const;
+  QString LegendTitle(const Layer& layer) const;
+  QString HiddenText(std::size_t count) const;
+  MapPick PickAt(MapPoint place) const;
+  double Reach() const;
+
+  MapContent content_;
+  DisplayUnits units_;
+  std::vector<std::unique_ptr<Layer>> layers_;
+  std::vector<ShapePicture> shapes_;
+  MapWindow window_;
+  QRectF legendPlace_;
+  bool hasTicks_ = false;
+  bool isFitted_ = true;  ///< The whole area is seen, and is to be after a change of size too.
+  QPixmap scene_;         ///< As last drawn; null when it must be drawn anew.
+  Gesture gesture_ = Gesture::None;
+  bool isSecondClick_ = false;
+  QPointF pressedAt_, draggedTo_;
+};
+
+}  // namespace tervane

@@ -1,0 +1,226 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/maps/map_palette.h"
+
+#include <QCoreApplication>
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <limits>
+
+#include "shell/widgets/qt_text.h"
+
+namespace tervane {
+
+namespace {
+
+/// From low to high: lighter to darker, so that the order is seen without colours too, and neither end is lost on white
+/// or dark paper.
+constexpr std::array<QRgb, 7> kRamp{0xfff6e7a1, 0xffc3dc8c, 0xff83c795, 0xff48aca5, 0xff3388ad, 0xff3a62a8, 0xff4b3c8f};
+
+/// Colours that are told apart side by side.
+constexpr std::array<QRgb, 20> kDistinct{0xff4e79a7, 0xfff28e2b, 0xff59a14f, 0xffe15759, 0xffb07aa1,
+                                         0xff76b7b2, 0xffedc948, 0xff9c755f, 0xffff9da7, 0xff6b8e23,
+                                         0xffa0cbe8, 0xffffbe7d, 0xff8cd17d, 0xffd37295, 0xff499894,
+                                         0xffd4a6c8, 0xffb6992d, 0xffd7b5a6, 0xff7b68c8, 0xff86bcb6};
+
+constexpr QRgb kHighlight = 0xffe07b2a;
+constexpr QRgb kOthers = 0xffa9b6c2;
+
+QRgb RampColor(double part) {
+  const double at = std::clamp(part, 0.0, 1.0) * static_cast<double>(kRamp.size() - 1);
+  const auto low = std::min(static_cast<std::size_t>(at), kRamp.size() - 2);
+  const double weight = at - static_cast<double>(low);
+  const auto mix = [&](int a, int b) { return static_cast<int>(std::lround(a + weight * (b - a))); };
+  const QRgb a = kRamp[low], b = kRamp[low + 1];
+  return qRgb(mix(qRed(a), qRed(b)), mix(qGreen(a), qGreen(b)), mix(qBlue(a), qBlue(b)));
+}
+
+/// Beyond the distinct colours hues step by the golden angle, which never comes near an earlier one soon.
+QRgb CodeColor(std::size_t ordinal) {
+  if (ordinal < kDistinct.size()) return kDistinct[ordinal];
+  const double turn = static_cast<double>(ordinal) * 0.618033988749895;
+  const int saturation = 75 + static_cast<int>(ordinal % 3) * 40;
+  const int value = 235 - static_cast<int>(ordinal / 3 % 3) * 40;
+  return QColor::fromHsv(static_cast<int>((turn - std::floor(turn)) * 359), saturation, value).rgb();
+}
+
+/// Values of which so much lies at one end that equal classes would show nothing else.
+struct Range {
+  double low = 0, high = 0;
+  bool isOpenBelow = false, isOpenAbove = false;
+};
+
+Range RangeOf(const CTvn2DOrthoRotatedGridData& grid, double smallest, double largest) {
+  constexpr std::size_t kSamples = 20'000;
+  constexpr double kOftenWider = 4;
+  const std::vector<float>& values = grid.Values();
+  std::vector<float> sample;
+  // A stride that shares no factor with common row lengths, so that not always the same columns are met.
+  const std::size_t stride = std::max<std::size_t>(1, values.size() / kSamples) | 1;
+  for (std::size_t i = 0; i < values.size(); i += stride)
+    if (!grid.IsEmptyValue(values[i])) sample.push_back(values[i]);
+  Range range{smallest, largest};
+  if (sample.size() < 50) return range;
+  std::ranges::sort(sample);
+  const double low = sample[sample.size() / 100], high = sample[sample.size() - 1 - sample.size() / 100];
+  if (high <= low || largest - smallest < kOftenWider * (high - low)) return range;
+  range.isOpenBelow = low - smallest > high - low;
+  range.isOpenAbove = largest - high > high - low;
+  if (range.isOpenBelow) range.low = low;
+  if (range.isOpenAbove) range.high = high;
+  return range;
+}
+
+}  // namespace
+
+ShownUnit::ShownUnit(int itemType, int storedUnit, const DisplayUnits* units) {
+  const ItemType* item = FindItemType(itemType);
+  const Unit* stored = FindUnit(storedUnit);
+  if (!stored && item) stored = &BaseUnit(*item);
+  if (!stored) return;
+  const Unit* shown = !item ? stored : units ? &units->UnitOf(*item) : &BaseUnit(*item);
+  const auto there = ConversionBetween(stored->scale, shown->scale);
+  const auto back = ConversionBetween(shown->scale, stored->scale);
+  if (there && back) {
+    toShown_ = *there;
+    toStored_ = *back;
+    text_ = shown->abbreviation;
+  } else {
+    text_ = stored->abbreviation;
+  }
+}
+
+QString ShownUnit::Value(double stored) const {
+  const QString number = ToQt(FormatNumber(Shown(stored), "%.6g"));
+  return text_.empty() ? number : number + " " + ToQt(text_);
+}
+
+double NiceStep(double atLeast) {
+  const double power = std::pow(10.0, std::floor(std::log10(atLeast)));
+  for (const double factor : {1.0, 2.0, 2.5, 5.0})
+    if (factor * power >= atLeast * (1 - 1e-9)) return factor * power;
+  return 10 * power;
+}
+
+std::vector<double> ClassBorders(double smallest, double largest) {
+  constexpr double kMostClasses = 10;
+  // What a conversion of single precision numbers may be off a border, in steps.
+  constexpr double kNoise = 1e-5;
+  const double tiny = 1e-6 * std::max(std::abs(smallest), std::abs(largest));
+  if (!(largest - smallest > tiny)) return {smallest};
+  double step = NiceStep((largest - smallest) / kMostClasses * (1 - kNoise));
+  const auto first = [&] { return std::floor(smallest / step + kNoise); };
+  const auto last = [&] { return std::ceil(largest / step - kNoise); };
+  while (last() - first() > kMostClasses) step = NiceStep(step * 1.01);
+  std::vector<double> borders;
+  for (double i = first(); i <= last(); ++i) borders.push_back(i * step);
+  return borders;
+}
+
+QString NumberInSteps(double value, double step) {
+  const double size = std::abs(step);
+  if (size >= 1e7 || size < 1e-5) return ToQt(FormatNumber(value, "%.4g"));
+  int decimals = 0;
+  for (double scaled = size; decimals < 7 && std::abs(scaled - std::round(scaled)) > 1e-6 * scaled; scaled *= 10)
+    ++decimals;
+  return QString::number(value == 0 ? 0.0 : value, 'f', decimals);
+}
+
+MapPalette MapPalette::Of(const GridLayer& layer, const DisplayUnits* units) {
+  const CTvn2DOrthoRotatedGridData& grid = *layer.grid;
+  MapPalette palette;
+  palette.deleteValue_ = grid.DeleteValue();
+  palette.colors_ = {qRgba(0, 0, 0, 0)};
+  if (layer.highlighted)
+    palette.MakeHighlighted(layer);
+  else if (layer.isCodes)
+    palette.MakeCodes(grid);
+  else
+    palette.MakeClasses(layer, ShownUnit(grid.ItemType(), grid.ItemUnit(), units));
+  return palette;
+}
+
+void MapPalette::MakeClasses(const GridLayer& layer, const ShownUnit& unit) {
+  Range range;
+  if (layer.range) {
+    range = {static_cast<double>(layer.range->first), static_cast<double>(layer.range->second)};
+  } else {
+    float largest = 0, smallest = 0;
+    if (!layer.grid->GetMaxMin(largest, smallest)) return;
+    constexpr float kMost = std::numeric_limits<float>::max();
+    range = RangeOf(*layer.grid, std::max(smallest, -kMost), std::min(largest, kMost));
+  }
+  // The numbers are to be nice in the unit in which the user sees them.
+  const std::vector<double> shown = ClassBorders(unit.Shown(range.low), unit.Shown(range.high));
+  for (const double border : shown) borders_.push_back(unit.Stored(border));
+  if (shown.size() == 1) {
+    borders_.push_back(borders_.front());
+    colors_.push_back(RampColor(0.5));
+    legend_.push_back({QColor(colors_.back()), ToQt(FormatNumber(shown.front(), "%.6g"))});
+    return;
+  }
+  const std::size_t classes = shown.size() - 1;
+  perClass_ = static_cast<double>(classes) / (borders_.back() - borders_.front());
+  const double step = shown[1] - shown[0];
+  for (std::size_t i = 0; i < classes; ++i) {
+    colors_.push_back(RampColor(static_cast<double>(i) / static_cast<double>(classes - 1)));
+    const QString from = NumberInSteps(shown[i], step), to = NumberInSteps(shown[i + 1], step);
+    QString text = QString::fromUtf8("%1 – %2").arg(from, to);
+    if (i == 0 && range.isOpenBelow) text = QCoreApplication::translate("MapPalette", "below %1").arg(to);
+    if (i + 1 == classes && range.isOpenAbove) text = QCoreApplication::translate("MapPalette", "above %1").arg(from);
+    legend_.insert(legend_.begin(), {QColor(colors_.back()), text});
+  }
+}
+
+void MapPalette::MakeCodes(const CTvn2DOrthoRotatedGridData& grid) {
+  constexpr unsigned kSmallCodes = 1 << 16;
+  kind_ = Kind::Codes;
+  if (!grid.GetIntValues(codes_)) return;
+  const std::size_t count = std::min<std::size_t>(codes_.size(), kMostColors);
+  for (std::size_t i = 0; i < count; ++i) colors_.push_back(CodeColor(i));
+  colorOfCode_.resize(std::min(codes_.back() + 1, kSmallCodes));
+  for (std::size_t i = 0; i < codes_.size() && codes_[i] < colorOfCode_.size(); ++i)
+    colorOfCode_[codes_[i]] = static_cast<std::uint8_t>(1 + i % kMostColors);
+  for (std::size_t i = 0; i < std::min<std::size_t>(codes_.size(), kMostRows); ++i)
+    legend_.push_back({QColor(colors_[1 + i]), QString::number(codes_[i])});
+}
+
+void MapPalette::MakeHighlighted(const GridLayer& layer) {
+  kind_ = Kind::Highlighted;
+  highlighted_ = *layer.highlighted;
+  colors_ = {colors_.front(), kHighlight, kOthers};
+  legend_ = {{QColor(kHighlight), ToQt(FormatNumber(static_cast<double>(highlighted_), "%.6g"))},
+             {QColor(kOthers), QCoreApplication::translate("MapPalette", "others")}};
+}
+
+std::uint8_t MapPalette::ColorNumber(float value) const {
+  if (value == deleteValue_ || value != value) return 0;
+  switch (kind_) {
+    case Kind::Highlighted:
+      return value == highlighted_ ? 1 : 2;
+    case Kind::Codes: {
+      const double code = std::floor(static_cast<double>(value) + 0.5);
+      if (!(code >= 0) || code >= 4294967296.0) return 0;
+      const auto whole = static_cast<unsigned>(code);
+      if (whole < colorOfCode_.size()) return colorOfCode_[whole];
+      const auto found = std::ranges::lower_bound(codes_, whole);
+      if (found == codes_.end() || *found != whole) return 0;
+      return static_cast<std::uint8_t>(1 + (found - codes_.begin()) % kMostColors);
+    }
+    case Kind::Classes:
+      break;
+  }
+  const auto classes = static_cast<int>(borders_.size()) - 1;
+  if (classes < 1) return 0;
+  const double number = (static_cast<double>(value) - borders_.front()) * perClass_;
+  int index = number >= classes ? classes - 1 : number > 0 ? static_cast<int>(number) : 0;
+  // The estimate may miss by a rounding at a border; a border belongs to the class above it. Borders are exact for the
+  // cell's type: 0.3 in a file is to be the border 0.3.
+  const auto border = [&](int i) { return static_cast<float>(borders_[static_cast<std::size_t>(i)]); };
+  if (index + 1 < classes && value >= border(index + 1)) ++index;
+  if (index > 0 && value < border(index)) --index;
+  return static_cast<std::uint8_t>(1 + index);
+}
+
+}  // namespace tervane

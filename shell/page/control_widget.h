@@ -1,0 +1,85 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// A control of a page on the screen. Who adds a kind of control to `pages/` adds its widget here, once.
+#pragma once
+
+#include <QLabel>
+#include <QObject>
+#include <QPointer>
+#include <QString>
+#include <QWidget>
+#include <functional>
+#include <memory>
+#include <vector>
+
+#include "forms/page.h"
+
+class QBoxLayout;
+
+namespace tervane {
+
+/// What a control shows in, kept in step with its page. The widgets belong to the form in which they are laid out.
+class ControlWidget : public QObject {
+  Q_OBJECT
+
+ public:
+  /// Null for the kinds that hold other controls: groups and places of sub-forms.
+  static std::unique_ptr<ControlWidget> Make(CYbSEDlgBase& page, Control& control);
+
+  Control& Described() const { return control_; }
+  /// What stands in front of the field; null where the field bears its label itself.
+  QWidget* Label() const { return label_; }
+  /// The field with all that stands beside and below it.
+  QWidget* Field() const { return field_; }
+  /// Whether the field takes all the height that it can get.
+  virtual bool GrowsDown() const { return false; }
+  /// Whether the field grows with the window beyond the width of a form.
+  virtual bool GrowsRight() const { return false; }
+
+  /// Shows the value as the page has it and applies the page's rules; a text that was refused stays in its field.
+  void Sync();
+  /// Hands over what was typed and not yet entered.
+  virtual void Commit() {}
+  /// The widget that takes the keyboard; null where there is none.
+  virtual QWidget* FocusTarget() const { return nullptr; }
+  /// The value is none that the page takes, so that the node has another one.
+  bool IsRefused() const { return !refusal_.isEmpty(); }
+
+ signals:
+  /// The user wants to see quantities of that item type in that unit.
+  void UnitChosen(int itemType, int unit);
+
+ protected:
+  ControlWidget(CYbSEDlgBase& page, Control& control);
+
+  virtual void SyncValue() = 0;
+  virtual void SyncEnabled(bool enabled) { field_->setEnabled(enabled); }
+  /// Enters a typed value; a refusal is shown below the field. False when it was refused.
+  bool Enter(const QString& typed);
+  /// What is wrong with a value that is not refused, such as one outside its list.
+  void SetRemark(const QString& remark);
+  /// The marks in which a refused value stands out.
+  virtual void ShowRefused(bool /*refused*/) {}
+
+  CYbSEDlgBase& Page() const { return page_; }
+  /// Puts the label in front of the field.
+  void MakeLabel();
+  /// Makes the field around an editor, with the unit and the marks behind it.
+  QBoxLayout* MakeField(QWidget* editor, bool grows);
+
+ private:
+  QWidget* MakeUnit();
+  void SyncUnit();
+  void SyncFindings();
+  void SyncMessage();
+
+  CYbSEDlgBase& page_;
+  Control& control_;
+  QPointer<QWidget> label_, field_;
+  QPointer<QWidget> unit_;  ///< A label, or a button where the user may choose.
+  QPointer<QLabel> mark_, message_;
+  QString refusal_, remark_;
+};
+
+}  // namespace tervane

@@ -1,0 +1,357 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/page/page_view.h"
+
+#include <QGridLayout>
+#include <QGroupBox>
+#include <QLabel>
+#include <QScrollArea>
+#include <QSplitter>
+#include <QStyle>
+#include <QVBoxLayout>
+#include <algorithm>
+
+#include "shell/page/control_widget.h"
+#include "shell/page/group_row.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr int kWidestForm = 860;  ///< In pixels at zoom 1: lines stay short enough to be read.
+constexpr int kSideBySide = 760;  ///< From this width of a page on its map stands beside the form.
+constexpr int kFormBesidePlot = 530;
+constexpr int kMostFindings = 4;  ///< Lines below a form; the tab of findings has them all.
+
+enum Column { kLabelColumn, kFieldColumn };
+
+QString SeverityText(Severity severity) {
+  return severity == Severity::Error     ? PageView::tr("Error")
+         : severity == Severity::Warning ? PageView::tr("Warning")
+                                         : PageView::tr("Note");
+}
+
+}  // namespace
+
+struct PageView::Form {
+  QGridLayout* grid;
+  int depth;
+  int row = 0;
+  bool isBeside = false;  ///< Stands in one row with others: its labels align with nobody's.
+};
+
+struct PageView::SubForms {
+  const Control* control;
+  std::vector<QWidget*> forms;
+  QWidget* place;
+};
+
+PageView::PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path)
+    : ownPage_(std::move(page)), page_(*ownPage_) {
+  Build(path);
+}
+
+PageView::PageView(CYbSEDlgBase& form) : page_(form) { Build({}); }
+
+void PageView::Build(const QString& path) {
+  const Theme& theme = Theme::Get();
+  const int margin = theme.Scaled(16);
+  auto* all = new QVBoxLayout(this);
+  all->setContentsMargins(0, 0, 0, 0);
+  all->setSpacing(0);
+
+  auto* top = new QWidget;
+  auto* head = new QVBoxLayout(top);
+  head->setContentsMargins(margin, theme.Scaled(12), margin, theme.Scaled(8));
+  head->setSpacing(theme.Scaled(2));
+  auto* title = new QLabel(Translated(page_.Node().GetTitle()));
+  QFont bold = title->font();
+  bold.setPointSizeF(bold.pointSizeF() * 1.35);
+  bold.setWeight(QFont::DemiBold);
+  title->setFont(bold);
+  title->setWordWrap(true);
+  head->addWidget(title);
+  auto* place = new QLabel(path);
+  QPalette quiet = place->palette();
+  quiet.setColor(QPalette::WindowText, theme.QuietColor());
+  place->setPalette(quiet);
+  place->setTextInteractionFlags(Qt::TextSelectableByMouse);
+  place->setToolTip(tr("The node's path, as messages and the command line write it"));
+  head->addWidget(place);
+  all->addWidget(top);
+  top->setVisible(ownPage_ != nullptr);
+
+  QWidget* form = BuildForm(page_.Form(), 0);
+  auto* content = new QWidget;
+  auto* column = new QVBoxLayout(content);
+  column->setContentsMargins(margin, theme.Scaled(4), margin, margin);
+  auto* row = new QHBoxLayout;
+  row->setContentsMargins(0, 0, 0, 0);
+  if (!growsRight_) form->setMaximumWidth(std::max(theme.Scaled(kWidestForm), widest_));
+  row->addWidget(form, 1);
+  if (!growsRight_) row->addStretch(0);
+  column->addLayout(row, growsDown_ ? 1 : 0);
+  if (!growsDown_) column->addStretch(1);
+
+  scroll_ = new QScrollArea;
+  scroll_->setFrameShape(QFrame::NoFrame);
+  scroll_->setWidgetResizable(true);
+  scroll_->setWidget(content);
+  if (plots_.empty()) {
+    all->addWidget(scroll_, 1);
+  } else {
+    split_ = new QSplitter;
+    split_->setChildrenCollapsible(false);
+    split_->addWidget(scroll_);
+    split_->addWidget(plotPlace_);
+    split_->setStretchFactor(1, 1);
+    all->addWidget(split_, 1);
+  }
+  // Below all: a finding that comes or goes must not move the field in which somebody types.
+  findings_ = new QLabel;
+  findings_->setWordWrap(true);
+  findings_->setTextFormat(Qt::RichText);
+  findings_->setContentsMargins(margin, theme.Scaled(6), margin, theme.Scaled(6));
+  findings_->hide();
+  all->addWidget(findings_);
+  AlignLabels();
+  Sync();
+  // What is hidden before it was ever shown leaves the sizes that the layouts above it know.
+  for (QLayout* layout : findChildren<QLayout*>()) layout->invalidate();
+}
+
+PageView::~PageView() = default;
+
+QSize PageView::WantedSize() const {
+  const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
+  const QSize content = scroll_->widget()->sizeHint();
+  return {std::max(content.width() + bar, Theme::Get().Scaled(520)), content.height() + bar};
+}
+
+QWidget* PageView::BuildForm(PageForm& form, int depth) {
+  auto* widget = new QWidget;
+  auto* grid = new QGridLayout(widget);
+  const Theme& theme = Theme::Get();
+  grid->setContentsMargins(0, 0, 0, 0);
+  grid->setHorizontalSpacing(theme.Scaled(12));
+  grid->setVerticalSpacing(theme.Scaled(8));
+  grid->setColumnStretch(kFieldColumn, 1);
+  Form& built = *forms_.emplace_back(std::make_unique<Form>(Form{grid, depth}));
+
+  std::vector<Control*> row;
+  const auto finish = [&] {
+    if (!row.empty()) AddRow(built, row);
+    row.clear();
+  };
+  for (const auto& control : form.Controls()) {
+    const bool isPlot = control->kind == ControlKind::Map || control->kind == ControlKind::Chart;
+    if (isPlot && &form == &page_.Form()) {
+      AddPlot(*control);
+      continue;
+    }
+    if (!control->beside) finish();
+    row.push_back(control.get());
+  }
+  finish();
+  return widget;
+}
+
+/// The widget of a group or of a place of sub-forms, and of any other control that stands without a label in front.
+QWidget* PageView::BuildCell(Control& control, int depth) {
+  if (control.kind == ControlKind::Group) {
+    auto* box = new QGroupBox(Translated(control.label));
+    auto* column = new QVBoxLayout(box);
+    const int margin = Theme::Get().Scaled(10);
+    column->setContentsMargins(margin, margin, margin, margin);
+    column->addWidget(BuildForm(*control.group, depth + 1));
+    groups_.emplace_back(&control, box);
+    return box;
+  }
+  if (control.kind == ControlKind::SubForms) {
+    auto* place = new QWidget;
+    auto* column = new QVBoxLayout(place);
+    column->setContentsMargins(0, 0, 0, 0);
+    auto& subForms = *subForms_.emplace_back(std::make_unique<SubForms>(SubForms{&control, {}, place}));
+    for (const auto& form : control.subForms) {
+      subForms.forms.push_back(BuildForm(*form, depth));
+      column->addWidget(subForms.forms.back());
+    }
+    return place;
+  }
+  ControlWidget& made = *widgets_.emplace_back(ControlWidget::Make(page_, control));
+  connect(&made, &ControlWidget::UnitChosen, this, &PageView::UnitChosen);
+  growsDown_ |= made.GrowsDown();
+  growsRight_ |= made.GrowsRight();
+  return made.Field();
+}
+
+void PageView::AddRow(Form& built, const std::vector<Control*>& row) {
+  QGridLayout& grid = *built.grid;
+  const int line = built.row++;
+  const bool allGroups =
+      std::ranges::all_of(row, [](const Control* control) { return control->kind == ControlKind::Group; });
+  if (row.size() > 1 && allGroups) {
+    auto* groups = new GroupRow;
+    for (Control* control : row) {
+      const std::size_t before = forms_.size();
+      groups->Add(BuildCell(*control, built.depth));
+      for (std::size_t i = before; i < forms_.size(); ++i) forms_[i]->isBeside = true;
+    }
+    widest_ = std::max(widest_, groups->FullWidth());
+    grid.addWidget(groups, line, kLabelColumn, 1, 2);
+    return;
+  }
+  Control& first = *row.front();
+  QWidget* cell = BuildCell(first, built.depth);
+  QWidget* label = nullptr;
+  bool growsDown = false;
+  if (!widgets_.empty() && &widgets_.back()->Described() == &first) {
+    label = widgets_.back()->Label();
+    growsDown = widgets_.back()->GrowsDown();
+  }
+  if (row.size() == 1 && !label) {
+    grid.addWidget(cell, line, kLabelColumn, 1, 2, growsDown ? Qt::Alignment() : Qt::AlignTop);
+  } else if (row.size() == 1) {
+    // The label stands at the height of the field's first line.
+    label->setContentsMargins(0, Theme::Get().Scaled(4), 0, 0);
+    grid.addWidget(label, line, kLabelColumn, Qt::AlignLeft | Qt::AlignTop);
+    grid.addWidget(cell, line, kFieldColumn, growsDown ? Qt::Alignment() : Qt::AlignTop);
+  } else {
+    // The first stands in the place of a label, or with its own in front; the others follow it.
+    auto* others = new QHBoxLayout;
+    others->setSpacing(Theme::Get().Scaled(12));
+    if (label) {
+      label->setContentsMargins(0, Theme::Get().Scaled(4), 0, 0);
+      grid.addWidget(label, line, kLabelColumn, Qt::AlignLeft | Qt::AlignTop);
+      others->addWidget(cell);
+    } else {
+      grid.addWidget(cell, line, kLabelColumn);
+    }
+    for (std::size_t i = 1; i < row.size(); ++i) {
+      QWidget* next = BuildCell(*row[i], built.depth);
+      if (QWidget* nextLabel = widgets_.back()->Label()) others->addWidget(nextLabel);
+      others->addWidget(next, 1);
+    }
+    grid.addLayout(others, line, kFieldColumn);
+  }
+  if (growsDown) grid.setRowStretch(line, 1);
+}
+
+void PageView::AddPlot(Control& control) {
+  if (!plotPlace_) {
+    plotPlace_ = new QWidget;
+    auto* column = new QVBoxLayout(plotPlace_);
+    const int margin = Theme::Get().Scaled(8);
+    column->setContentsMargins(margin, 0, margin, margin);
+  }
+  ControlWidget& made = *widgets_.emplace_back(ControlWidget::Make(page_, control));
+  // A chart and a map below each other share the height.
+  static_cast<QVBoxLayout*>(plotPlace_->layout())->addWidget(made.Field(), 1);
+  plots_.push_back(&control);
+}
+
+void PageView::PlacePlots() {
+  const Theme& theme = Theme::Get();
+  // Beside a form of a few lines a map would be narrow for nothing.
+  const int neededHeight = scroll_->widget()->sizeHint().height();
+  const bool isWide = width() >= theme.Scaled(kSideBySide) && neededHeight > height() / 3;
+  const auto orientation = isWide ? Qt::Horizontal : Qt::Vertical;
+  const int all = isWide ? width() : height();
+  const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
+  const int neededWidth = scroll_->widget()->minimumSizeHint().width() + bar;
+  // Above a map the form takes no more than it needs.
+  const int most = isWide ? all * 3 / 5 : all / 2;
+  const int form = isWide ? std::clamp(neededWidth, std::min(theme.Scaled(kFormBesidePlot), most), most)
+                          : std::min(neededHeight, most);
+  // What the user has moved stays until the page is another one.
+  if (split_->orientation() == orientation && formSize_ == form) return;
+  formSize_ = form;
+  split_->setOrientation(orientation);
+  split_->setSizes({form, std::max(all - form, 1)});
+}
+
+void PageView::resizeEvent(QResizeEvent* event) {
+  QWidget::resizeEvent(event);
+  if (split_) PlacePlots();
+}
+
+void PageView::AlignLabels() {
+  // A group's frame moves its content to the right by its margin: labels inside are that much narrower.
+  const int step = Theme::Get().Scaled(10) + 3;
+  const auto labelWidth = [](const Form& form) {
+    int width = 0;
+    for (int row = 0; row < form.grid->rowCount(); ++row) {
+      const QLayoutItem* item = form.grid->itemAtPosition(row, kLabelColumn);
+      if (item && item != form.grid->itemAtPosition(row, kFieldColumn))
+        width = std::max(width, item->sizeHint().width());
+    }
+    return width;
+  };
+  int widest = 0;
+  for (const auto& form : forms_)
+    if (!form->isBeside) widest = std::max(widest, labelWidth(*form) + form->depth * step);
+  for (const auto& form : forms_)
+    if (!form->isBeside && labelWidth(*form) > 0)
+      form->grid->setColumnMinimumWidth(kLabelColumn, widest - form->depth * step);
+}
+
+void PageView::Sync() {
+  for (const auto& place : subForms_) {
+    const int current = place->control->currentSubForm();
+    for (std::size_t i = 0; i < place->forms.size(); ++i) place->forms[i]->setVisible(static_cast<int>(i) == current);
+    place->place->setVisible(current >= 0 && current < static_cast<int>(place->forms.size()));
+  }
+  for (const auto& [control, box] : groups_) {
+    box->setVisible(control->IsShown());
+    // A group of which nothing can be changed stands back as a whole.
+    const auto& inside = control->group->Controls();
+    box->setEnabled(std::ranges::any_of(inside, [](const auto& each) { return each->IsEnabled(); }));
+  }
+  for (const auto& widget : widgets_) widget->Sync();
+  if (plotPlace_)
+    plotPlace_->setVisible(std::ranges::any_of(plots_, [](const Control* control) { return control->IsShown(); }));
+  if (split_ && isVisible()) PlacePlots();
+  SyncFindings();
+}
+
+void PageView::SyncFindings() {
+  const Theme& theme = Theme::Get();
+  QString lines;
+  int count = 0;
+  const auto add = [&](const Finding& finding) {
+    if (++count > kMostFindings) return;
+    const QColor color = finding.severity == Severity::Error     ? theme.ErrorColor()
+                         : finding.severity == Severity::Warning ? theme.WarningColor()
+                                                                 : theme.QuietColor();
+    QString text = Translated(finding.text).toHtmlEscaped().replace("\n", "<br>");
+    if (!finding.detail.empty()) text += " — " + ToQt(finding.detail).toHtmlEscaped();
+    lines += QString("<div><b style='color:%1'>%2</b>&nbsp; %3</div>")
+                 .arg(color.name(), SeverityText(finding.severity), text);
+  };
+  for (const Finding& finding : page_.Node().Findings()) add(finding);
+  if (count > kMostFindings) lines += "<div>" + tr("and %n more", nullptr, count - kMostFindings) + "</div>";
+  findings_->setText(lines);
+  findings_->setVisible(count > 0);
+}
+
+void PageView::Commit() {
+  for (const auto& widget : widgets_) widget->Commit();
+}
+
+void PageView::FocusOn(const std::string& key) {
+  const auto takesKeyboard = [](const auto& widget) {
+    return widget->FocusTarget() && widget->Described().IsShown() && widget->Described().IsEnabled();
+  };
+  auto found = std::ranges::find_if(widgets_, [&](const auto& widget) {
+    const Control& control = widget->Described();
+    return !key.empty() && (control.key == key || control.label == key) && widget->FocusTarget();
+  });
+  if (found == widgets_.end()) found = std::ranges::find_if(widgets_, takesKeyboard);
+  if (found == widgets_.end()) return;
+  (*found)->FocusTarget()->setFocus(Qt::ShortcutFocusReason);
+  scroll_->ensureWidgetVisible((*found)->Field());
+}
+
+}  // namespace tervane

@@ -1,0 +1,82 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <QFrame>
+#include <QWidget>
+#include <memory>
+#include <vector>
+
+#include "forms/page.h"
+
+class QGridLayout;
+class QLabel;
+class QScrollArea;
+class QSplitter;
+
+namespace tervane {
+
+class ControlWidget;
+
+/// Any page as widgets: the node's title, the form below, labels aligned over all of its groups, and the findings at
+/// the foot.
+class PageView : public QWidget {
+  Q_OBJECT
+
+ public:
+  /// `path` is shown below the title.
+  PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path);
+  /// The form alone, of a dialog that owns it.
+  explicit PageView(CYbSEDlgBase& form);
+  ~PageView() override;
+
+  CYbSEDlgBase& Page() const { return page_; }
+  /// The size at which nothing needs to be scrolled.
+  QSize WantedSize() const;
+  /// Shows what the node holds now.
+  void Sync();
+  /// Hands over what was typed and not yet entered.
+  void Commit();
+  /// Puts the keyboard on the control of a key, or with that label; the first control when there is none.
+  void FocusOn(const std::string& key);
+
+ signals:
+  void UnitChosen(int itemType, int unit);
+
+ protected:
+  void resizeEvent(QResizeEvent* event) override;
+
+ private:
+  struct Form;  ///< A grid of one form, group or sub-form.
+  struct SubForms;
+
+  QWidget* BuildForm(PageForm& form, int depth);
+  /// Places one control, or several that stand beside each other, in the next row.
+  void AddRow(Form& grid, const std::vector<Control*>& row);
+  QWidget* BuildCell(Control& control, int depth);
+  /// A map or chart of the page itself stands beside the form, or below it where the page is narrow.
+  void AddPlot(Control& control);
+  void PlacePlots();
+  void AlignLabels();
+  void SyncFindings();
+
+  void Build(const QString& path);
+
+  std::unique_ptr<CYbSEDlgBase> ownPage_;
+  CYbSEDlgBase& page_;
+  std::vector<std::unique_ptr<ControlWidget>> widgets_;
+  std::vector<std::unique_ptr<Form>> forms_;
+  std::vector<std::unique_ptr<SubForms>> subForms_;
+  /// Groups, whose frames follow the rules of their controls.
+  std::vector<std::pair<const Control*, QWidget*>> groups_;
+  std::vector<const Control*> plots_;
+  QSplitter* split_ = nullptr;
+  QWidget* plotPlace_ = nullptr;
+  int formSize_ = 0;  ///< Of the form beside or above a plot, when it was given its place.
+  QLabel* findings_;
+  QScrollArea* scroll_;
+  bool growsDown_ = false, growsRight_ = false;
+  int widest_ = 0;  ///< What a row of groups would like to have.
+};
+
+}  // namespace tervane

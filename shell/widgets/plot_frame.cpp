@@ -1,0 +1,144 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/widgets/plot_frame.h"
+
+#include <QApplication>
+#include <QBuffer>
+#include <QClipboard>
+#include <QHBoxLayout>
+#include <QLabel>
+#include <QToolButton>
+#include <QVBoxLayout>
+#include <utility>
+
+#include "platform/files.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
+#include "shell/widgets/wait_panel.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr double kZoomStep = 1.5;
+constexpr int kNarrow = 460;       ///< In pixels at zoom 1: below, the line breaks into two.
+constexpr int kMoment = 25;        ///< In milliseconds: what takes no longer appears at once.
+constexpr double kPaperRatio = 2;  ///< Pixels of a picture for one of the screen.
+
+/// A text in one line that gives way where there is no room.
+class StatusLabel : public QLabel {
+ public:
+  StatusLabel() {
+    setTextFormat(Qt::PlainText);
+    setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Preferred);
+    setTextInteractionFlags(Qt::NoTextInteraction);
+  }
+  QSize minimumSizeHint() const override { return {0, QLabel::minimumSizeHint().height()}; }
+};
+
+}  // namespace
+
+PlotFrame::PlotFrame(Host& host, QWidget* parent) : QWidget(parent), host_(host), status_(new StatusLabel) {
+  setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
+}
+
+void PlotFrame::Hold(Plot plot) {
+  plot_ = std::move(plot);
+  auto* column = new QVBoxLayout(this);
+  column->setContentsMargins(0, 0, 0, 0);
+  column->setSpacing(2);
+  column->addWidget(plot_.widget, 1);
+  auto* row = new QHBoxLayout;
+  row->setSpacing(2);
+  row->addSpacing(Theme::Get().Scaled(4));
+  row->addWidget(status_, 1);
+  const auto add = [&](const QString& icon, const QString& tip, std::function<void()> command) {
+    auto* button = new QToolButton;
+    button->setAutoRaise(true);
+    button->setToolTip(tip);
+    button->setAccessibleName(tip);
+    connect(button, &QToolButton::clicked, this, std::move(command));
+    row->addWidget(button);
+    buttons_.emplace_back(button, icon);
+  };
+  add("insert", tr("Zoom in (+)"), [this] { plot_.zoom(kZoomStep); });
+  add("zoom_out", tr("Zoom out (-)"), [this] { plot_.zoom(1 / kZoomStep); });
+  add("fit", tr("Show everything (Home)"), [this] { plot_.fit(); });
+  column->addLayout(row);
+  plot_.widget->setContextMenuPolicy(Qt::ActionsContextMenu);
+  AddCommand(tr("&Fit"), [this] { plot_.fit(); });
+  AddCommand(tr("&Copy picture"), [this] { QApplication::clipboard()->setImage(plot_.picture(kPaperRatio)); });
+  AddCommand(tr("&Export as PNG..."), [this] { Export(); });
+  connect(&Theme::Get(), &Theme::Changed, this, &PlotFrame::FollowTheme);
+  FollowTheme();
+  panel_ = new WaitPanel(background_, *plot_.widget);
+  connect(&background_, &Background::Ended, this, [this] {
+    panel_->Sync();
+    // A page that was left is hidden first, and what it speaks of may be gone.
+    isAgainDue_ = !isVisible();
+    if (isVisible()) again_();
+  });
+}
+
+bool PlotFrame::IsThereInAMoment(const Awaited& awaited, const std::function<void()>& again) {
+  again_ = again;
+  isAgainDue_ = false;
+  const bool isThere = background_.Await(awaited) && background_.IsDoneWithin(kMoment);
+  if (!isThere) panel_->Sync();
+  return isThere;
+}
+
+void PlotFrame::StopWaiting() {
+  background_.StopWaiting();
+  isAgainDue_ = false;
+  panel_->Sync();
+}
+
+void PlotFrame::showEvent(QShowEvent* event) {
+  QWidget::showEvent(event);
+  if (std::exchange(isAgainDue_, false)) again_();
+}
+
+QAction* PlotFrame::AddCommand(const QString& text, std::function<void()> command) {
+  auto* action = new QAction(text, plot_.widget);
+  connect(action, &QAction::triggered, this, std::move(command));
+  plot_.widget->addAction(action);
+  return action;
+}
+
+void PlotFrame::SetStatus(const QString& text) { status_->setText(text); }
+
+QString PlotFrame::Status() const { return status_->text(); }
+
+void PlotFrame::FollowTheme() {
+  const int size = Theme::Get().Scaled(16);
+  for (const auto& [button, icon] : buttons_) {
+    button->setIcon(Theme::Get().Icon(icon));
+    button->setIconSize({size, size});
+  }
+  ArrangeStatus();
+}
+
+/// The line keeps its height whatever it says, since the plot would change its size with it.
+void PlotFrame::ArrangeStatus() {
+  const bool isNarrow = width() < Theme::Get().Scaled(kNarrow);
+  status_->setWordWrap(isNarrow);
+  status_->setAlignment(Qt::AlignLeft | (isNarrow ? Qt::AlignTop : Qt::AlignVCenter));
+  status_->setFixedHeight((isNarrow ? 2 : 1) * status_->fontMetrics().lineSpacing() + 4);
+}
+
+void PlotFrame::resizeEvent(QResizeEvent* /*event*/) { ArrangeStatus(); }
+
+void PlotFrame::Export() {
+  const auto path = host_.AskFileToSave({FromQt(tr("Export as PNG")), "PNG picture (*.png)|*.png||", "png", {}});
+  if (!path) return;
+  QByteArray bytes;
+  QBuffer buffer(&bytes);
+  buffer.open(QIODevice::WriteOnly);
+  plot_.picture(kPaperRatio).save(&buffer, "PNG");
+  const FileResult result =
+      WriteFileAtomically(*path, std::string_view(bytes.constData(), static_cast<std::size_t>(bytes.size())));
+  if (!result.Ok()) host_.Tell(result.error, Host::Icon::Error);
+}
+
+}  // namespace tervane

@@ -1,0 +1,173 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/page/page_view.h"
+
+#include <QAbstractButton>
+#include <QComboBox>
+#include <QGroupBox>
+#include <QPlainTextEdit>
+#include <QScrollArea>
+#include <QScrollBar>
+
+#include <gmock/gmock.h>
+
+#include "pages/tree_entries.h"
+#include "shell/widgets/theme.h"
+#include "tests/shell/opened_setup.h"
+#include "tests/support/preprocessed_run.h"
+
+namespace tervane {
+namespace {
+
+using test::OpenedSetup;
+
+TEST(PageView, ANumberThatIsNoneStaysInItsFieldAndNeverReachesTheNode) {
+  const struct {
+    const char *typed, *value, *shown, *message;
+  } cases[] = {
+      {"0.25", "0.25", "0.25", ""},   {"1 day", "24", "24", ""},       {"abc", "6", "abc", "number"},
+      {"5 km", "6", "5 km", "hours"}, {"1e99", "6", "1e99", "number"},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.typed);
+    OpenedSetup setup;
+    setup.GoTo("SimSpec/CompControlParaTimeStep:InitialTimeStep");
+    auto* field = setup.Focused<QLineEdit>();
+    setup.Type(c.typed);
+    setup.Press(Qt::Key_Return);
+    EXPECT_EQ(setup.Value("SimSpec/CompControlParaTimeStep:InitialTimeStep"), c.value);
+    EXPECT_EQ(field->text(), c.shown);
+    EXPECT_EQ(setup.Shows("Not taken"), *c.message != '\0');
+    EXPECT_TRUE(setup.Shows(c.message));
+    EXPECT_EQ(setup.Session().IsModified(), *c.message == '\0');
+    // Escape takes the node's value back.
+    setup.Press(Qt::Key_Escape);
+    EXPECT_EQ(field->text().toStdString(), c.value);
+    EXPECT_FALSE(setup.Shows("Not taken"));
+  }
+}
+
+TEST(PageView, AValueOutsideItsListIsShownAndSaid) {
+  OpenedSetup setup("section SimSpec {\nsection ModelComp {\nUZ_ModelType = 9\n}\n}");
+  setup.GoTo("SimSpec:UZ_ModelType");
+  auto* list = setup.Focused<QComboBox>();
+  EXPECT_EQ(list->currentText(), "9 (not in the list)");
+  EXPECT_TRUE(setup.Shows("not in the list"));
+  EXPECT_FALSE(setup.Session().IsModified());
+  setup.Press(Qt::Key_Home);
+  setup.Press(Qt::Key_Return);
+  EXPECT_EQ(setup.Value("SimSpec/ModelComp:UZ_ModelType"), "0");
+  EXPECT_FALSE(setup.Shows("not in the list"));
+  EXPECT_EQ(list->count(), 3);
+}
+
+TEST(PageView, KeysCountThePartOfADateThatTheCursorStandsIn) {
+  OpenedSetup setup;
+  setup.GoTo("SimSpec/SimulationPeriod:SIMEND");
+  auto* field = setup.Focused<QLineEdit>();
+  ASSERT_EQ(field->text(), "2000/02/01  00:00");
+  const struct {
+    int cursor;
+    Qt::Key key;
+    const char* shown;
+  } steps[] = {{0, Qt::Key_Up, "2001/02/01  00:00"},
+               {6, Qt::Key_Down, "2001/01/01  00:00"},
+               {9, Qt::Key_Down, "2000/12/31  00:00"},
+               {13, Qt::Key_Up, "2000/12/31  01:00"},
+               {16, Qt::Key_Down, "2000/12/31  00:59"}};
+  for (const auto& step : steps) {
+    field->setCursorPosition(step.cursor);
+    setup.Press(step.key);
+    EXPECT_EQ(field->text(), step.shown);
+    EXPECT_EQ(field->cursorPosition(), step.cursor);
+  }
+  EXPECT_EQ(setup.Value("SimSpec/SimulationPeriod:SIMEND"), "2000, 12, 31, 0, 59");
+}
+
+TEST(PageView, WhatIsTypedIsEnteredBeforeACommandAndWhenAnotherPageIsShown) {
+  OpenedSetup setup;
+  setup.GoTo("SimSpec/SimTitle:Title");
+  setup.Type("Karup");
+  setup.Command("Save");
+  EXPECT_THAT(test::ReadFile(setup.Path()), testing::HasSubstr("Title = \"Karup\""));
+  setup.Type("Skjern");
+  setup.GoTo("SimSpec");
+  EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "Skjern");
+  setup.GoTo("SimSpec/SimTitle:Description");
+  setup.Focused<QPlainTextEdit>()->insertPlainText("two\nlines");
+  setup.GoTo("SimSpec");
+  EXPECT_EQ(setup.Value("SimSpec/SimTitle:Description"), "two\nlines");
+}
+
+// ---- Pictures
+
+/// What is cut or lies over something else on the page that is shown.
+std::string Faults(PageView& page) {
+  std::string faults;
+  const auto tell = [&](const QWidget& widget, const QString& text, const char* what) {
+    faults += FromQt(QString("\"%1\" %2 (%3x%4)\n").arg(text, what).arg(widget.width()).arg(widget.height()));
+  };
+  for (QWidget* widget : page.findChildren<QWidget*>()) {
+    if (!widget->isVisible()) continue;
+    const auto* label = qobject_cast<QLabel*>(widget);
+    const auto* button = qobject_cast<QAbstractButton*>(widget);
+    const auto* list = qobject_cast<QComboBox*>(widget);
+    const QString text = label ? label->text() : button ? button->text() : list ? list->currentText() : QString();
+    if (text.isEmpty()) continue;
+    const int neededHeight =
+        label && label->wordWrap() ? label->heightForWidth(label->width()) : widget->sizeHint().height();
+    const bool wraps = label && label->wordWrap();
+    if (!wraps && widget->width() < widget->minimumSizeHint().width()) tell(*widget, text, "is cut at the right");
+    if (widget->height() < std::min(neededHeight, widget->minimumSizeHint().height()))
+      tell(*widget, text, "is cut below");
+    const auto siblings = widget->parentWidget()->findChildren<QWidget*>(Qt::FindDirectChildrenOnly);
+    for (const QWidget* sibling : siblings)
+      if (sibling != widget && sibling->isVisible() && !sibling->isWindow() &&
+          sibling->geometry().intersects(widget->geometry()))
+        tell(*widget, text, "lies over something");
+  }
+  if (page.findChild<QScrollArea*>()->horizontalScrollBar()->maximum() > 0)
+    faults += "the page is wider than its place\n";
+  return faults;
+}
+
+/// Setups in which every page shows all that it has.
+constexpr const char* kSetups[] = {
+    "section SimSpec {\nsection ModelComp {\nWQ = 1\nRiver = 1\nUseCurrentWmSimulation = 0\n}\n"
+    "section SimulationPeriod {\nHotStart = 1\n}\n}\n"
+    "section ModelCompWQ {\nOL = 1\nUZ = 1\nSZ = 1\nIncludeProcesses = 1\n}",
+    "section SimSpec {\nsection ModelComp {\nWQ = 1\nADPTRadio = 1\n}\n}",
+    "section SimSpec {\nModelType = 1\nsection ModModelComp {\nSubsurface_ModelType = 2\nWithAirFlow = 1\n}\n}"};
+
+TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
+  for (const double zoom : {1.0, 1.5}) {
+    Theme::Get().SetZoom(zoom);
+    for (const char* sections : kSetups) {
+      OpenedSetup setup(sections);
+      test::WritePreprocessedRun(setup.Folder().File("karup_results"), "karup");
+      setup.Frame().RebuildProcessedData();
+      int pages = 0;
+      std::vector<std::string> paths{"CCoverageKvf"};
+      const auto add = [&](int tree) {
+        for (const TreeEntry& entry : TreeEntries(setup.Session().Document().Root(), tree)) paths.push_back(entry.path);
+      };
+      add(kSetupDataTree);
+      // What the preprocessor left is the same of all setups.
+      if (sections == kSetups[0]) add(kProcessedDataTree);
+      for (const std::string& path : paths) {
+        SCOPED_TRACE(path + " at " + std::to_string(zoom));
+        setup.GoTo(path);
+        QApplication::processEvents();
+        auto* page = setup.Frame().findChild<PageView*>();
+        ASSERT_TRUE(page);
+        EXPECT_EQ(Faults(*page), "");
+        ++pages;
+      }
+      EXPECT_GT(pages, 5);
+    }
+  }
+  Theme::Get().SetZoom(1);
+}
+
+}  // namespace
+}  // namespace tervane
