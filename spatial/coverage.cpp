@@ -33,87 +33,6 @@ using GridData = CTvn2DOrthoRotatedGridData;
 
 CYbDateTime DateAt(std::int64_t seconds) { return CYbDateTime::FromSecondsSinceEpoch(seconds); }
 
-// ---- Asking
-
-/// What a node is called for people: the title of the nearest page above, with the station's name.
-std::string TitleOf(const CYbSEKvfBase& node) {
-  const CYbSEKvfBase* shown = &node;
-  while (shown && !shown->GetDlgRuntimeClass(kSetupDataTree)) shown = shown->GetParent();
-  if (!shown) return node.GetTitle();
-  const std::string& name = shown->GetAbbreviatedTitle();
-  const bool isOneOfMany = dynamic_cast<const CFMSEKvfGroupBase*>(shown) != nullptr;
-  return isOneOfMany && !name.empty() ? fmt::format("{}: {}", name, shown->GetTitle()) : shown->GetTitle();
-}
-
-DomainSource DomainOf(const CYbSEKvfBase& root) {
-  DomainSource source;
-  const auto* domain = root.Important<CCatchmentKvf>("CATCHMENT");
-  if (!domain) return source;
-  source.isShape = domain->Type == CCatchmentKvf::kShapeFile;
-  const FileName& file = source.isShape ? domain->ShapeFile().File : domain->GridFile().File;
-  source.file = file.IsEmpty() ? std::string() : file.Absolute();
-  source.stamps = StampsOfShape(source.file);
-  source.item = domain->GridFile().SelectedItem();
-  source.axisUnit = domain->ShapeAxisUnit;
-  source.geometry = DomainGeometryOf(root);
-  return source;
-}
-
-std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
-  const auto* period = root.Important<CSimPeriodKvf>("SIMPERIOD");
-  if (!period) return std::nullopt;
-  const CYbDateTime start = period->GetSimStartDate(), end = period->SIMEND;
-  if (!start.IsValid() || !end.IsValid() || end <= start) return std::nullopt;
-  return TimeSpan{start.SecondsSinceEpoch(), end.SecondsSinceEpoch()};
-}
-
-CoverageFile AskFile(const CYbSEKvfBase& node, FileUse use) {
-  CoverageFile file;
-  file.path = PathOf(node);
-  file.serial = node.Serial();
-  file.title = TitleOf(node);
-  file.findings = node.Findings();
-  // What the owner makes of the file, or its grid as it is.
-  if (auto* owner = dynamic_cast<CellValues*>(node.GetParent()); owner && use.isOverArea) {
-    file.values = owner->CurrentSource();
-    file.grid = owner->GridComputation();
-  } else if (use.isOverArea && use.kind == FileUse::Kind::Data) {
-    GridSource& source = file.values.emplace();
-    source.type = CData2DKvf::kGridFile;
-    source.file = use.path;
-    source.stamps = use.stamps;
-    source.item = use.item;
-  }
-  file.use = std::move(use);
-  return file;
-}
-
-/// Asks what takes part below a node that does.
-void AskBelow(const CYbSEKvfBase& node, CoverageRequest& request) {
-  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
-    if (!child->HoldsSetup() || !child->IsDlgUsedInSetup()) continue;
-    if (const auto* user = dynamic_cast<const FileUser*>(child))
-      if (std::optional<FileUse> use = user->UsedFile()) request.files.push_back(AskFile(*child, *std::move(use)));
-    if (const auto* forcing = dynamic_cast<const ForcingNode*>(child))
-      request.forcings.push_back({PathOf(*child), child->Serial(), forcing->CurrentForcing()});
-    AskBelow(*child, request);
-  }
-}
-
-}  // namespace
-
-CoverageRequest AskCoverage(CYbSEKvfBase& root) {
-  CoverageRequest request;
-  request.simulation = SimulationOf(root);
-  request.domain = DomainOf(root);
-  AskBelow(root, request);
-  return request;
-}
-
-// ---- Computing
-
-namespace {
-
 /// For each cell of the domain the place of the cell of another grid in which its centre lies; -1 off that grid.
 std::vector<std::ptrdiff_t> PlacesOf(const GridData& domain, const GridGeometry& grid) {
   const GridTransform own(grid);
@@ -607,16 +526,6 @@ AreaCells BoardMaker::CellsOf(const GridSource& source) {
   return cells;
 }
 
-/// A length of time for people: "12.5 days", "6 hours".
-std::string TimeLengthText(std::int64_t seconds) {
-  constexpr std::int64_t kHour = 3600, kDay = 86400;
-  const auto text = [&](std::int64_t unit, const char* name) {
-    const double count = std::round(static_cast<double>(seconds) / static_cast<double>(unit) * 10) / 10;
-    return fmt::format("{} {}{}", ShortestNumber(count), name, count == 1 ? "" : "s");
-  };
-  return seconds >= kDay ? text(kDay, "day") : seconds >= kHour ? text(kHour, "hour") : text(60, "minute");
-}
-
 }  // namespace
 
 FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous, CoverageBoard& board,
@@ -627,64 +536,6 @@ FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* 
     return {kCancelled, {}};
   }
   return {};
-}
-
-// ---- In words
-
-std::string_view NameOf(CoverageState state) {
-  constexpr std::string_view kNames[] = {"ok", "note", "warning", "error"};
-  return kNames[static_cast<std::size_t>(state)];
-}
-
-std::string ForcingTotals::Heading() const {
-  return fmt::format("{}, {} [{}]", forcing.forcing.title, form.isTotal ? "total" : "mean", form.unit);
-}
-
-std::string ForcingTotals::ColumnText(std::size_t column) const {
-  const Column& c = columns[column];
-  return c.share ? fmt::format("{} ({:.0f}%)", c.name, *c.share * 100) : c.name;
-}
-
-std::string ForcingTotals::ValueText(std::size_t column, std::size_t period, const TimeSpan& span) const {
-  const Column& c = columns[column];
-  if (period >= c.sums.size() || c.sums[period].covered == 0) return {};
-  std::string text = FormatNumber(form.Of(c.sums[period]), "%.5g");
-  const double share = static_cast<double>(c.sums[period].covered) / static_cast<double>(span.Seconds());
-  if (share < 1) text += fmt::format(" ({:.{}f}%)", share * 100, share > 0.995 ? 2 : 0);
-  return text;
-}
-
-std::string MissingCellsText(const CoverageRow& row) {
-  if (row.missing == 0) return {};
-  return fmt::format("{} of the domain {} no {}", row.missing == 1 ? "1 cell" : fmt::format("{} cells", row.missing),
-                     row.missing == 1 ? "has" : "have", LowerCase(row.file.title));
-}
-
-std::string CoverageRow::PeriodText() const {
-  if (period) return fmt::format("{} to {}", DateInWords(DateAt(period->start)), DateInWords(DateAt(period->end)));
-  return file.use.isOverTime && problem.empty() ? "at all times" : "";
-}
-
-std::string CoverageRow::TimeText() const {
-  if (!file.use.isOverTime || !problem.empty()) return {};
-  std::vector<std::string> parts;
-  if (late > 0) parts.push_back(fmt::format("starts {} late", TimeLengthText(late)));
-  if (early > 0) parts.push_back(fmt::format("ends {} early", TimeLengthText(early)));
-  if (!gaps.empty()) {
-    std::int64_t all = 0;
-    for (const TimeSpan& gap : gaps) all += gap.Seconds();
-    parts.push_back(gaps.size() == 1 ? fmt::format("a gap of {}", TimeLengthText(all))
-                                     : fmt::format("{} gaps, {}", gaps.size(), TimeLengthText(all)));
-  }
-  return parts.empty() ? "covers the simulation" : fmt::format("{}", fmt::join(parts, "; "));
-}
-
-std::string CoverageRow::AreaText() const {
-  if (!file.use.isOverArea || !problem.empty()) return {};
-  if (isInDegrees) return "in degrees";
-  if (cells == 0) return {};
-  if (missing == cells) return "covers no cell of the domain";
-  return missing == 0 ? "covers the domain" : fmt::format("{} of {} cells have no value", missing, cells);
 }
 
 }  // namespace tervane

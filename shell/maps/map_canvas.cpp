@@ -1,7 +1,5 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "shell/maps/map_canvas.h"
-
 #include <QApplication>
 #include <QFutureWatcher>
 #include <QMouseEvent>
@@ -13,6 +11,7 @@
 #include <array>
 #include <cmath>
 
+#include "shell/maps/map_canvas_parts.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -22,35 +21,13 @@ namespace {
 
 constexpr std::size_t kCellsAtOnce = 400'000;  ///< Made ready before the map is shown: a few milliseconds.
 constexpr int kMargin = 8;
-constexpr int kPadding = 10;      ///< Between map and legend.
-constexpr int kSwatchWidth = 20;  ///< In pixels at zoom 1, as all of these.
-constexpr double kClickRadius = 4;
-constexpr double kReach = 6;  ///< How near a line or point must be to be pointed at.
+constexpr double kClickRadius = 4;  ///< In pixels at zoom 1, as all of these.
+constexpr double kReach = 6;        ///< How near a line or point must be to be pointed at.
 constexpr double kZoomStep = 1.5;
 
 using Made = std::shared_ptr<const GridPicture>;
 
-double Scaled(double pixels) { return pixels * Theme::Get().Zoom(); }
-
-ShownUnit CoordinateUnit(const DisplayUnits& units) { return {kCoordinateItemType, 1000, &units}; }
-
 }  // namespace
-
-struct MapCanvas::Layer {
-  GridLayer grid;
-  int unitKey = 0;
-  Made picture;
-  std::shared_ptr<std::atomic<bool>> isGivenUp = std::make_shared<std::atomic<bool>>(false);
-  QFutureWatcher<Made> watcher;
-
-  ~Layer() { *isGivenUp = true; }
-};
-
-struct MapCanvas::ScaleBar {
-  double pixels = 0;
-  QString text, half;
-  QRectF box;
-};
 
 MapCanvas::MapCanvas(QWidget* parent) : QWidget(parent) {
   setMouseTracking(true);
@@ -161,9 +138,9 @@ void MapCanvas::Arrange() {
   if (hasTicks_) map.adjust(metrics.height() + Scaled(6), 0, 0, -metrics.height() - Scaled(6));
   legendPlace_ = {};
   // On a small map the legend stands back where it would take more than nearly half of the place.
-  if (const double width = LegendWidth(); width > 0 && width + Scaled(kPadding) < 0.45 * map.width()) {
+  if (const double width = LegendWidth(); width > 0 && width + Scaled(kLegendPadding) < 0.45 * map.width()) {
     legendPlace_ = QRectF(map.right() - width, map.top(), width, map.height());
-    map.setRight(legendPlace_.left() - Scaled(kPadding));
+    map.setRight(legendPlace_.left() - Scaled(kLegendPadding));
   }
   window_.rect = map.toAlignedRect();
   if (isFitted_)
@@ -330,223 +307,6 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio) {
   painter.restore();
   DrawFrame(painter);
   DrawLegends(painter);
-}
-
-void MapCanvas::DrawFrame(QPainter& painter) {
-  const QColor ink = Theme::Get().QuietColor();
-  painter.setRenderHint(QPainter::Antialiasing, false);
-  painter.setPen(QPen(ink, 1));
-  painter.setBrush(Qt::NoBrush);
-  painter.drawRect(window_.rect.adjusted(0, 0, -1, -1));
-  if (hasTicks_) {
-    const ShownUnit unit = CoordinateUnit(units_);
-    const QFontMetricsF metrics(painter.font());
-    const double width = metrics.horizontalAdvance("0000000.0") + Scaled(24);
-    const double step = NiceStep(unit.Shown(window_.metresPerPixel) * width);
-    const MapPoint low = window_.ToMap(window_.rect.bottomLeft()), high = window_.ToMap(window_.rect.topRight());
-    const double tick = Scaled(4);
-    painter.setPen(ink);
-    for (double i = std::ceil(unit.Shown(low.x) / step); i * step <= unit.Shown(high.x); ++i) {
-      const double x = window_.ToScreen({unit.Stored(i * step), 0}).x(), y = window_.rect.bottom();
-      const QString text = NumberInSteps(i * step, step);
-      const double half = metrics.horizontalAdvance(text) / 2;
-      // A label may reach a little beyond the frame, not into the legend.
-      if (x - half < 0 || x + half > window_.rect.right() + Scaled(kPadding)) continue;
-      painter.drawLine(QPointF(x, y), QPointF(x, y + tick));
-      painter.drawText(QPointF(x - half, y + tick + metrics.ascent()), text);
-    }
-    for (double i = std::ceil(unit.Shown(low.y) / step); i * step <= unit.Shown(high.y); ++i) {
-      const double y = window_.ToScreen({0, unit.Stored(i * step)}).y(), x = window_.rect.left();
-      const QString text = NumberInSteps(i * step, step);
-      const double half = metrics.horizontalAdvance(text) / 2;
-      if (y - half < 0 || y + half > height()) continue;
-      painter.drawLine(QPointF(x, y), QPointF(x - tick, y));
-      painter.save();
-      painter.translate(x - tick - metrics.descent(), y + half);
-      painter.rotate(-90);
-      painter.drawText(QPointF(0, 0), text);
-      painter.restore();
-    }
-  }
-  painter.setRenderHint(QPainter::Antialiasing);
-}
-
-QRectF MapCanvas::NorthArrowPlace() const {
-  const double size = Scaled(22);
-  return {window_.rect.right() - size - Scaled(8), window_.rect.top() + Scaled(8), size, size * 1.7};
-}
-
-void MapCanvas::DrawNorthArrow(QPainter& painter) {
-  const QRectF place = NorthArrowPlace();
-  const double size = place.width();
-  QColor paper = palette().color(QPalette::Base);
-  paper.setAlpha(215);
-  painter.setPen(Qt::NoPen);
-  painter.setBrush(paper);
-  painter.drawRoundedRect(place.adjusted(-2, -2, 2, 2), Scaled(4), Scaled(4));
-  const QColor ink = palette().color(QPalette::Text);
-  const double x = place.center().x(), top = place.top() + Scaled(2), bottom = top + size * 0.85;
-  QPainterPath left, right;
-  left.addPolygon(QPolygonF({{x, top}, {x, bottom - size * 0.2}, {x - size * 0.32, bottom}, {x, top}}));
-  right.addPolygon(QPolygonF({{x, top}, {x, bottom - size * 0.2}, {x + size * 0.32, bottom}, {x, top}}));
-  painter.setPen(QPen(ink, 1));
-  painter.setBrush(Qt::NoBrush);
-  painter.fillPath(left, ink);
-  painter.drawPath(left);
-  painter.drawPath(right);
-  QFont bold = painter.font();
-  bold.setBold(true);
-  const QFont plain = painter.font();
-  painter.setFont(bold);
-  painter.drawText(QRectF(place.left(), bottom, size, place.bottom() - bottom), Qt::AlignCenter, tr("N", "north"));
-  painter.setFont(plain);
-}
-
-MapCanvas::ScaleBar MapCanvas::MakeScaleBar() const {
-  const ShownUnit unit = CoordinateUnit(units_);
-  const double widest = std::min(Scaled(140), window_.rect.width() / 3) * window_.metresPerPixel;
-  QString name = ToQt(unit.Text());
-  // Metres become kilometres where they are many; another unit of the user's stays.
-  const bool inKilometres = name == "m" && widest >= 1000;
-  if (inKilometres) name = "km";
-  const double factor = inKilometres ? 1000 : 1, most = unit.Shown(widest) / factor;
-  // Halves are told too: 2.5 would give odd ones.
-  double length = std::pow(10.0, std::floor(std::log10(most)));
-  for (const double times : {5.0, 2.0})
-    if (times * length <= most) {
-      length *= times;
-      break;
-    }
-  ScaleBar scale;
-  scale.pixels = unit.Stored(length * factor) / window_.metresPerPixel;
-  scale.text = ToQt(FormatNumber(length, "%.6g")) + " " + name;
-  scale.half = ToQt(FormatNumber(length / 2, "%.6g"));
-  const QFontMetricsF metrics(font());
-  const double padding = Scaled(6), height = Scaled(5) + metrics.height() + 2 * padding - Scaled(4);
-  const double textEnd = scale.pixels + metrics.horizontalAdvance(scale.text) - metrics.horizontalAdvance("0") / 2;
-  scale.box = QRectF(window_.rect.left() + Scaled(8), window_.rect.bottom() - Scaled(8) - height, textEnd + 2 * padding,
-                     height);
-  return scale;
-}
-
-void MapCanvas::DrawScaleBar(QPainter& painter, const ScaleBar& scale) {
-  if (!(scale.pixels > 4) || scale.box.width() > window_.rect.width()) return;
-  const QFontMetricsF metrics(painter.font());
-  const double bar = Scaled(5), padding = Scaled(6), digit = metrics.horizontalAdvance("0") / 2;
-  QColor paper = palette().color(QPalette::Base);
-  paper.setAlpha(215);
-  painter.setPen(Qt::NoPen);
-  painter.setBrush(paper);
-  painter.drawRoundedRect(scale.box, Scaled(4), Scaled(4));
-  const QColor ink = palette().color(QPalette::Text);
-  const QPointF start(scale.box.left() + padding, scale.box.bottom() - padding - bar);
-  painter.fillRect(QRectF(start, QSizeF(scale.pixels, bar)), palette().color(QPalette::Base));
-  painter.fillRect(QRectF(start, QSizeF(scale.pixels / 2, bar)), ink);
-  painter.setPen(QPen(ink, 1));
-  painter.setBrush(Qt::NoBrush);
-  painter.drawRect(QRectF(start, QSizeF(scale.pixels, bar)));
-  const double baseline = start.y() - Scaled(3) - metrics.descent() * 0.5;
-  painter.drawText(QPointF(start.x() - digit / 2, baseline), "0");
-  const double halfWidth = metrics.horizontalAdvance(scale.half), halfAt = start.x() + (scale.pixels - halfWidth) / 2;
-  if (halfAt + halfWidth + digit < start.x() + scale.pixels - digit)
-    painter.drawText(QPointF(halfAt, baseline), scale.half);
-  painter.drawText(QPointF(start.x() + scale.pixels - digit, baseline), scale.text);
-}
-
-// ---- Legend
-
-QString MapCanvas::LegendTitle(const Layer& layer) const {
-  const CTvn2DOrthoRotatedGridData& grid = *layer.grid.grid;
-  QString title = ToQt(grid.ItemName());
-  const ItemType* item = FindItemType(grid.ItemType());
-  if (title.isEmpty() && item && item->code != kUndefinedItemType) title = Translated(std::string(item->name));
-  const std::string unit = ShownUnit(grid.ItemType(), grid.ItemUnit(), &units_).Text();
-  if (!unit.empty() && !layer.grid.isCodes) title += (title.isEmpty() ? "[" : " [") + ToQt(unit) + "]";
-  return title;
-}
-
-QString MapCanvas::HiddenText(std::size_t count) const { return tr("and %n more", nullptr, static_cast<int>(count)); }
-
-double MapCanvas::LegendWidth() const {
-  const QFontMetricsF metrics(font());
-  double width = 0;
-  for (const auto& layer : layers_) {
-    if (!layer->picture || !layer->grid.withLegend) continue;
-    const MapPalette& colors = layer->picture->Palette();
-    for (const MapPalette::Row& row : colors.Legend())
-      width = std::max(width, Scaled(kSwatchWidth + 8) + metrics.horizontalAdvance(row.text));
-    width = std::max(width, metrics.horizontalAdvance(HiddenText(10000)) * (colors.HiddenCodes() > 0));
-    // A long title breaks into lines, so that it does not take the map's place.
-    QFont bold = font();
-    bold.setBold(true);
-    const QFontMetricsF boldMetrics(bold);
-    for (const QString& word : LegendTitle(*layer).split(' '))
-      width = std::max(width, boldMetrics.horizontalAdvance(word));
-  }
-  return width > 0 ? std::ceil(std::max(width, Scaled(90))) + 2 : 0;
-}
-
-void MapCanvas::DrawLegends(QPainter& painter) {
-  if (legendPlace_.isEmpty()) return;
-  QRectF place = legendPlace_;
-  // What stands on top is told first.
-  for (auto layer = layers_.rbegin(); layer != layers_.rend(); ++layer) {
-    if (!(*layer)->picture || !(*layer)->grid.withLegend) continue;
-    place.setTop(place.top() + DrawLegend(painter, **layer, place) + Scaled(12));
-  }
-}
-
-double MapCanvas::DrawLegend(QPainter& painter, const Layer& layer, QRectF place) {
-  const MapPalette& colors = layer.picture->Palette();
-  const QColor ink = palette().color(QPalette::Text);
-  QFont bold = painter.font();
-  const QFont plain = painter.font();
-  bold.setBold(true);
-  painter.setFont(bold);
-  painter.setPen(ink);
-  QRectF title;
-  painter.drawText(place, Qt::AlignLeft | Qt::AlignTop | Qt::TextWordWrap, LegendTitle(layer), &title);
-  painter.setFont(plain);
-  double y = title.isEmpty() ? place.top() : title.bottom() + Scaled(5);
-
-  const QFontMetricsF metrics(plain);
-  std::size_t count = colors.Legend().size(), hidden = colors.HiddenCodes();
-  const double room = place.bottom() - y, usual = metrics.height() + Scaled(colors.IsScale() ? 3 : 4);
-  double rowHeight = usual;
-  if (colors.IsScale()) {
-    // A scale stays whole: its rows grow flat, and only every so many are labelled.
-    rowHeight = std::min(usual, std::max(room / static_cast<double>(std::max<std::size_t>(count, 1)), 3.0));
-  } else if (usual * static_cast<double>(count + (hidden > 0)) > room) {
-    const auto fits = static_cast<std::size_t>(std::max(room / usual - 1, 0.0));
-    hidden += count - std::min(count, fits);
-    count = std::min(count, fits);
-  }
-  const auto labelEvery = static_cast<std::size_t>(std::ceil(metrics.height() * 0.85 / rowHeight));
-  for (std::size_t i = 0; i < count; ++i) {
-    const MapPalette::Row& row = colors.Legend()[i];
-    const double gap = colors.IsScale() ? 0 : Scaled(4);
-    const QRectF swatch(place.left(), y + gap / 2, Scaled(kSwatchWidth), rowHeight - gap);
-    QColor color = row.color;
-    color.setAlphaF(static_cast<float>(1 - layer.grid.transparency));
-    painter.fillRect(swatch, color);
-    painter.setPen(QPen(Theme::Get().QuietColor(), 1));
-    painter.setBrush(Qt::NoBrush);
-    painter.setRenderHint(QPainter::Antialiasing, false);
-    painter.drawRect(swatch);
-    painter.setRenderHint(QPainter::Antialiasing);
-    painter.setPen(ink);
-    if (i % labelEvery == 0)
-      painter.drawText(QRectF(swatch.right() + Scaled(8), y + rowHeight / 2 - usual / 2, place.width(), usual),
-                       Qt::AlignLeft | Qt::AlignVCenter, row.text);
-    y += rowHeight;
-  }
-  if (hidden > 0) {
-    painter.setPen(Theme::Get().QuietColor());
-    painter.drawText(QRectF(place.left(), y, place.width(), usual), Qt::AlignLeft | Qt::AlignVCenter,
-                     HiddenText(hidden));
-    y += usual;
-  }
-  return y - place.top();
 }
 
 // ---- Mouse and keyboard

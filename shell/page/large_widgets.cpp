@@ -1,0 +1,97 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <QHBoxLayout>
+
+#include "forms/plots.h"
+#include "shell/charts/series_plot.h"
+#include "shell/maps/map_canvas.h"
+#include "shell/maps/map_view.h"
+#include "shell/page/control_widgets.h"
+#include "shell/page/table_view.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
+
+namespace tervane {
+
+namespace {
+
+class TableWidget : public ControlWidget {
+ public:
+  TableWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    MakeLabel();
+    table_ = new TableView(page, control);
+    connect(table_, &TableView::UnitChosen, this, &ControlWidget::UnitChosen);
+    MakeField(table_, true);
+  }
+  bool GrowsDown() const override { return true; }
+  bool GrowsRight() const override { return true; }
+  QWidget* FocusTarget() const override { return table_->FocusTarget(); }
+  void Commit() override { table_->Commit(); }
+
+ protected:
+  void SyncValue() override { table_->Sync(); }
+
+ private:
+  TableView* table_;
+};
+
+class MapWidget : public ControlWidget {
+ public:
+  MapWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    view_ = new MapView(page.Outside());
+    MakeField(view_, true);
+  }
+  bool GrowsDown() const override { return true; }
+  bool GrowsRight() const override { return true; }
+  QWidget* FocusTarget() const override { return &view_->Canvas(); }
+
+ protected:
+  void SyncValue() override {
+    if (Described().IsShown())
+      view_->ShowWhenThere(Described().map, Described().displayUnits);
+    else
+      view_->StopWaiting();
+  }
+
+ private:
+  MapView* view_;
+};
+
+class ChartWidget : public ControlWidget {
+ public:
+  ChartWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    plot_ = new SeriesPlot(page.Outside());
+    MakeField(plot_, true);
+  }
+  bool GrowsDown() const override { return true; }
+  bool GrowsRight() const override { return true; }
+  QWidget* FocusTarget() const override { return plot_->FocusTarget(); }
+
+ protected:
+  void SyncValue() override {
+    if (Described().IsShown())
+      plot_->ShowWhenThere(Described().chart);
+    else
+      plot_->StopWaiting();
+  }
+
+ private:
+  SeriesPlot* plot_;
+};
+
+}  // namespace
+
+std::unique_ptr<ControlWidget> MakeLargeWidget(CYbSEDlgBase& page, Control& control) {
+  switch (control.kind) {
+    case ControlKind::Table:
+      return std::make_unique<TableWidget>(page, control);
+    case ControlKind::Map:
+      return std::make_unique<MapWidget>(page, control);
+    case ControlKind::Chart:
+      return std::make_unique<ChartWidget>(page, control);
+    default:
+      return nullptr;
+  }
+}
+
+}  // namespace tervane

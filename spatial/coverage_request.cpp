@@ -1,0 +1,92 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <fmt/format.h>
+
+#include "geometry/shapes.h"
+#include "simspec/periods.h"
+#include "spatial/coverage.h"
+#include "spatial/data2d.h"
+#include "spatial/domain.h"
+#include "spatial/placement.h"
+#include "spatial/zone_sync.h"
+
+namespace tervane {
+
+namespace {
+
+/// What a node is called for people: the title of the nearest page above, with the station's name.
+std::string TitleOf(const CYbSEKvfBase& node) {
+  const CYbSEKvfBase* shown = &node;
+  while (shown && !shown->GetDlgRuntimeClass(kSetupDataTree)) shown = shown->GetParent();
+  if (!shown) return node.GetTitle();
+  const std::string& name = shown->GetAbbreviatedTitle();
+  const bool isOneOfMany = dynamic_cast<const CFMSEKvfGroupBase*>(shown) != nullptr;
+  return isOneOfMany && !name.empty() ? fmt::format("{}: {}", name, shown->GetTitle()) : shown->GetTitle();
+}
+
+DomainSource DomainOf(const CYbSEKvfBase& root) {
+  DomainSource source;
+  const auto* domain = root.Important<CCatchmentKvf>("CATCHMENT");
+  if (!domain) return source;
+  source.isShape = domain->Type == CCatchmentKvf::kShapeFile;
+  const FileName& file = source.isShape ? domain->ShapeFile().File : domain->GridFile().File;
+  source.file = file.IsEmpty() ? std::string() : file.Absolute();
+  source.stamps = StampsOfShape(source.file);
+  source.item = domain->GridFile().SelectedItem();
+  source.axisUnit = domain->ShapeAxisUnit;
+  source.geometry = DomainGeometryOf(root);
+  return source;
+}
+
+std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
+  const auto* period = root.Important<CSimPeriodKvf>("SIMPERIOD");
+  if (!period) return std::nullopt;
+  const CYbDateTime start = period->GetSimStartDate(), end = period->SIMEND;
+  if (!start.IsValid() || !end.IsValid() || end <= start) return std::nullopt;
+  return TimeSpan{start.SecondsSinceEpoch(), end.SecondsSinceEpoch()};
+}
+
+CoverageFile AskFile(const CYbSEKvfBase& node, FileUse use) {
+  CoverageFile file;
+  file.path = PathOf(node);
+  file.serial = node.Serial();
+  file.title = TitleOf(node);
+  file.findings = node.Findings();
+  // What the owner makes of the file, or its grid as it is.
+  if (auto* owner = dynamic_cast<CellValues*>(node.GetParent()); owner && use.isOverArea) {
+    file.values = owner->CurrentSource();
+    file.grid = owner->GridComputation();
+  } else if (use.isOverArea && use.kind == FileUse::Kind::Data) {
+    GridSource& source = file.values.emplace();
+    source.type = CData2DKvf::kGridFile;
+    source.file = use.path;
+    source.stamps = use.stamps;
+    source.item = use.item;
+  }
+  file.use = std::move(use);
+  return file;
+}
+
+/// Asks what takes part below a node that does.
+void AskBelow(const CYbSEKvfBase& node, CoverageRequest& request) {
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
+    if (!child->HoldsSetup() || !child->IsDlgUsedInSetup()) continue;
+    if (const auto* user = dynamic_cast<const FileUser*>(child))
+      if (std::optional<FileUse> use = user->UsedFile()) request.files.push_back(AskFile(*child, *std::move(use)));
+    if (const auto* forcing = dynamic_cast<const ForcingNode*>(child))
+      request.forcings.push_back({PathOf(*child), child->Serial(), forcing->CurrentForcing()});
+    AskBelow(*child, request);
+  }
+}
+
+}  // namespace
+
+CoverageRequest AskCoverage(CYbSEKvfBase& root) {
+  CoverageRequest request;
+  request.simulation = SimulationOf(root);
+  request.domain = DomainOf(root);
+  AskBelow(root, request);
+  return request;
+}
+
+}  // namespace tervane

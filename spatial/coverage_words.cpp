@@ -1,0 +1,86 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <cmath>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include "platform/dates.h"
+#include "platform/text.h"
+#include "spatial/coverage.h"
+
+namespace tervane {
+
+namespace {
+
+CYbDateTime DateAt(std::int64_t seconds) { return CYbDateTime::FromSecondsSinceEpoch(seconds); }
+
+/// A length of time for people: "12.5 days", "6 hours".
+std::string TimeLengthText(std::int64_t seconds) {
+  constexpr std::int64_t kHour = 3600, kDay = 86400;
+  const auto text = [&](std::int64_t unit, const char* name) {
+    const double count = std::round(static_cast<double>(seconds) / static_cast<double>(unit) * 10) / 10;
+    return fmt::format("{} {}{}", ShortestNumber(count), name, count == 1 ? "" : "s");
+  };
+  return seconds >= kDay ? text(kDay, "day") : seconds >= kHour ? text(kHour, "hour") : text(60, "minute");
+}
+
+}  // namespace
+
+std::string_view NameOf(CoverageState state) {
+  constexpr std::string_view kNames[] = {"ok", "note", "warning", "error"};
+  return kNames[static_cast<std::size_t>(state)];
+}
+
+std::string ForcingTotals::Heading() const {
+  return fmt::format("{}, {} [{}]", forcing.forcing.title, form.isTotal ? "total" : "mean", form.unit);
+}
+
+std::string ForcingTotals::ColumnText(std::size_t column) const {
+  const Column& c = columns[column];
+  return c.share ? fmt::format("{} ({:.0f}%)", c.name, *c.share * 100) : c.name;
+}
+
+std::string ForcingTotals::ValueText(std::size_t column, std::size_t period, const TimeSpan& span) const {
+  const Column& c = columns[column];
+  if (period >= c.sums.size() || c.sums[period].covered == 0) return {};
+  std::string text = FormatNumber(form.Of(c.sums[period]), "%.5g");
+  const double share = static_cast<double>(c.sums[period].covered) / static_cast<double>(span.Seconds());
+  if (share < 1) text += fmt::format(" ({:.{}f}%)", share * 100, share > 0.995 ? 2 : 0);
+  return text;
+}
+
+std::string MissingCellsText(const CoverageRow& row) {
+  if (row.missing == 0) return {};
+  return fmt::format("{} of the domain {} no {}", row.missing == 1 ? "1 cell" : fmt::format("{} cells", row.missing),
+                     row.missing == 1 ? "has" : "have", LowerCase(row.file.title));
+}
+
+std::string CoverageRow::PeriodText() const {
+  if (period) return fmt::format("{} to {}", DateInWords(DateAt(period->start)), DateInWords(DateAt(period->end)));
+  return file.use.isOverTime && problem.empty() ? "at all times" : "";
+}
+
+std::string CoverageRow::TimeText() const {
+  if (!file.use.isOverTime || !problem.empty()) return {};
+  std::vector<std::string> parts;
+  if (late > 0) parts.push_back(fmt::format("starts {} late", TimeLengthText(late)));
+  if (early > 0) parts.push_back(fmt::format("ends {} early", TimeLengthText(early)));
+  if (!gaps.empty()) {
+    std::int64_t all = 0;
+    for (const TimeSpan& gap : gaps) all += gap.Seconds();
+    parts.push_back(gaps.size() == 1 ? fmt::format("a gap of {}", TimeLengthText(all))
+                                     : fmt::format("{} gaps, {}", gaps.size(), TimeLengthText(all)));
+  }
+  return parts.empty() ? "covers the simulation" : fmt::format("{}", fmt::join(parts, "; "));
+}
+
+std::string CoverageRow::AreaText() const {
+  if (!file.use.isOverArea || !problem.empty()) return {};
+  if (isInDegrees) return "in degrees";
+  if (cells == 0) return {};
+  if (missing == cells) return "covers no cell of the domain";
+  return missing == 0 ? "covers the domain" : fmt::format("{} of {} cells have no value", missing, cells);
+}
+
+}  // namespace tervane
