@@ -6,6 +6,7 @@
 
 #include <fmt/format.h>
 
+#include "platform/item_types.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -30,21 +31,20 @@ std::string WhyTypeIsWrong(int number, const DataItem& item, const std::vector<i
     names += (names.empty() ? "" : isLast ? " or " : ", ") + NameOfItemType(code);
   }
   return fmt::format("item {} {}, {} was expected", number,
-                     item.itemType == kUndefinedItemType ? "has no item type" : "is " + NameOfItemType(item.itemType),
+                     item.itemType == quantity::kUndefined ? "has no item type" : "is " + NameOfItemType(item.itemType),
                      names);
 }
 
 /// Why an item cannot be converted to its quantity, or stands on cells that no grid here has.
 std::string WhyValuesAreUnfit(int number, const DataItem& item, const DataFileRequest& request) {
   const ItemType* type = request.itemTypes.empty() ? nullptr : FindItemType(item.itemType);
-  if (type && type->code != kUndefinedItemType &&
+  if (type && type->code != quantity::kUndefined &&
       (!item.scale || item.scale->dimension != BaseUnit(*type).scale.dimension))
     return fmt::format("item {} is in \"{}\", which is no unit of {}", number, item.unitText, type->name);
-  const FileGeometry& g = item.geometry;
-  if (item.dimensions >= 2 && !g.HasSquareCells())
-    return fmt::format("item {} has cells of {} x {}, square ones were expected; resample the grid", number,
-                       ShortestNumber(g.cellSize), ShortestNumber(g.cellHeight));
-  return {};
+  if (item.dimensions < 2) return {};
+  GridGeometry grid;
+  const std::string reason = ToModelGrid(item.geometry, grid);
+  return reason.empty() ? "" : fmt::format("item {} has {}; resample the grid", number, reason);
 }
 
 std::string Plural(std::size_t count, std::string_view one, std::string_view many) {

@@ -139,4 +139,36 @@ bool IsLocalPlane(std::string_view wkt) { return BeginsWithAny(wkt, {"ENGCRS", "
 
 bool IsGeographicalWkt(std::string_view wkt) { return BeginsWithAny(wkt, {"GEOGCRS", "GEOGRAPHICCRS", "GEOGCS"}); }
 
+std::string ToModelGrid(const FileGeometry& file, GridGeometry& grid) {
+  if (!file.HasSquareCells())
+    return fmt::format("cells of {} x {}, square ones were expected", ShortestNumber(file.cellSize),
+                       ShortestNumber(file.cellHeight));
+  grid = {file.nx, file.ny, file.IsPlaced() ? file.cellSize : 1.0, file.x0, file.y0, file.rotation, file.projection};
+  return {};
+}
+
+FileGeometry FileGeometryOf(const GridGeometry& grid) {
+  FileGeometry place;
+  place.nx = grid.nx;
+  place.ny = grid.ny;
+  place.cellSize = place.cellHeight = grid.cellSize;
+  place.x0 = grid.x0;
+  place.y0 = grid.y0;
+  place.rotation = grid.rotation;
+  place.projection = grid.projection;
+  return place;
+}
+
+Envelope EnvelopeOf(const FileGeometry& geometry) {
+  // As of a grid of one cell width whose rows are as high as the file's.
+  const GridTransform transform({geometry.nx, geometry.ny, 1, geometry.x0, geometry.y0, geometry.rotation, {}});
+  const double width = geometry.nx * geometry.cellSize, height = geometry.ny * geometry.cellHeight;
+  Envelope box{geometry.x0, geometry.y0, geometry.x0, geometry.y0};
+  for (const MapPoint corner : {MapPoint{width, 0}, MapPoint{0, height}, MapPoint{width, height}}) {
+    const MapPoint at = transform.ToWorld(corner);
+    box = {std::min(box.xMin, at.x), std::min(box.yMin, at.y), std::max(box.xMax, at.x), std::max(box.yMax, at.y)};
+  }
+  return box;
+}
+
 }  // namespace tervane

@@ -11,6 +11,8 @@
 #include <string_view>
 #include <vector>
 
+#include "geometry/grid.h"
+
 namespace tervane {
 
 /// The cells of a line (ny and nz 1), a grid (nz 1) or layers of grids. Column 0 is the west, row 0 the south, layer 0
@@ -25,10 +27,18 @@ struct FileGeometry {
   bool isGeographical = false;
 
   bool IsPlaced() const { return cellSize > 0; }
-  /// But for what rounding loses.
+  /// But for what rounding loses: a raster of 50.00 x 50.01 m has square cells.
   bool HasSquareCells() const { return !IsPlaced() || std::abs(cellHeight - cellSize) <= 1e-3 * cellSize; }
   bool operator==(const FileGeometry&) const = default;
 };
+
+/// The cells as a model's grid has them, those of a grid without a place 1 wide. Gives why they are none, "cells of 50
+/// x 25, square ones were expected", or nothing; then `grid` is as it was.
+[[nodiscard]] std::string ToModelGrid(const FileGeometry& file, GridGeometry& grid);
+/// The same place in the words of data files.
+FileGeometry FileGeometryOf(const GridGeometry& grid);
+/// The smallest axis-parallel rectangle around the cells, of any shape.
+Envelope EnvelopeOf(const FileGeometry& geometry);
 
 /// Values along an axis at equal distances.
 struct EvenAxis {

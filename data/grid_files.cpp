@@ -9,6 +9,7 @@
 #include "data/datafile_facts.h"
 #include "data/datafile_writer.h"
 #include "geometry/grid_interpolation.h"
+#include "platform/item_types.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -17,22 +18,15 @@ namespace {
 
 FileResult Failed(std::string error) { return {std::move(error), {}}; }
 
-/// Why an item cannot be read as a grid of square cells; empty when it can.
-std::string WhyNoGrid(const std::string& path, const std::vector<DataItem>& items, int number) {
+/// Where an item's cells stand in a model; why it cannot be read as a grid of square cells, or nothing.
+std::string GeometryOfItem(const std::string& path, const std::vector<DataItem>& items, int number,
+                           GridGeometry& geometry) {
   if (number < 1 || static_cast<std::size_t>(number) > items.size())
     return fmt::format("{}: there is no item {}: the file has {}", path, number, items.size());
   const DataItem& item = items[static_cast<std::size_t>(number - 1)];
   if (item.dimensions < 2) return fmt::format("{}: item {} is no grid", path, number);
-  const FileGeometry& g = item.geometry;
-  if (!g.HasSquareCells())
-    return fmt::format("{}: item {} has cells of {} x {}, square ones are expected; resample the grid", path, number,
-                       ShortestNumber(g.cellSize), ShortestNumber(g.cellHeight));
-  return {};
-}
-
-GridGeometry GeometryOf(const DataItem& item) {
-  const FileGeometry& g = item.geometry;
-  return {g.nx, g.ny, g.IsPlaced() ? g.cellSize : 1.0, g.x0, g.y0, g.rotation, g.projection};
+  const std::string reason = ToModelGrid(item.geometry, geometry);
+  return reason.empty() ? "" : fmt::format("{}: item {} has {}; resample the grid", path, number, reason);
 }
 
 }  // namespace
@@ -42,9 +36,10 @@ FileResult ReadGridData(const std::string& path, int number, CTvn2DOrthoRotatedG
   if (path.empty()) return Failed("no file is chosen");
   DataFile file;
   if (std::string error = file.Open(path); !error.empty()) return Failed(std::move(error));
-  if (std::string reason = WhyNoGrid(path, file.Items(), number); !reason.empty()) return Failed(std::move(reason));
+  GridGeometry geometry;
+  if (std::string reason = GeometryOfItem(path, file.Items(), number, geometry); !reason.empty())
+    return Failed(std::move(reason));
   const DataItem* item = &file.Items()[static_cast<std::size_t>(number - 1)];
-  GridGeometry geometry = GeometryOf(*item);
   if (std::string problem = geometry.Problem(); !problem.empty()) return Failed(fmt::format("{}: {}", path, problem));
   std::vector<float> values(item->CellsOfLayer());
   const ValueSelection selection{number, slice.step, 1,
@@ -54,25 +49,13 @@ FileResult ReadGridData(const std::string& path, int number, CTvn2DOrthoRotatedG
   for (float& value : values)
     if (value == kDeleteValue) value = kUsualDeleteValue;
   const ItemType* type = FindItemType(item->itemType);
-  const int unit = type && type->code != kUndefinedItemType ? BaseUnit(*type).key : item->unitKey;
+  const int unit = type && type->code != quantity::kUndefined ? BaseUnit(*type).key : item->unitKey;
   if (std::string problem =
           grid.TakeValues(std::move(geometry), std::move(values), kUsualDeleteValue, unit, item->itemType);
       !problem.empty())
     return Failed(fmt::format("{}: {}", path, problem));
   grid.SetItemName(item->name);
   return {};
-}
-
-FileGeometry FileGeometryOf(const GridGeometry& geometry) {
-  FileGeometry place;
-  place.nx = geometry.nx;
-  place.ny = geometry.ny;
-  place.cellSize = place.cellHeight = geometry.cellSize;
-  place.x0 = geometry.x0;
-  place.y0 = geometry.y0;
-  place.rotation = geometry.rotation;
-  place.projection = geometry.projection;
-  return place;
 }
 
 FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
@@ -94,9 +77,7 @@ FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridDa
 
 FileResult ReadGeoInfoFromNdsFile(const std::string& path, int number, GridGeometry& geometry) {
   const auto file = DataFileFactsOf(path);
-  FileResult result = Failed(file->error.empty() ? WhyNoGrid(path, file->items, number) : file->error);
-  if (result.Ok()) geometry = GeometryOf(*file->Item(number));
-  return result;
+  return Failed(file->error.empty() ? GeometryOfItem(path, file->items, number, geometry) : file->error);
 }
 
 std::string ItemNameOf(const std::string& path, int number) {

@@ -30,8 +30,6 @@ FileResult ReadGridData(const std::string& path, int item, CTvn2DOrthoRotatedGri
                         const GridSlice& slice = {});
 /// Writes a grid as a data file with one item and no time axis, in place of a file of that name.
 FileResult WriteGridData(const std::string& path, const CTvn2DOrthoRotatedGridData& grid, ProgressPart progress = {});
-/// The same place in the words of data files.
-FileGeometry FileGeometryOf(const GridGeometry& geometry);
 /// Where the grid of an item stands, without its values.
 FileResult ReadGeoInfoFromNdsFile(const std::string& path, int item, GridGeometry& geometry);
 /// The name of an item; empty when there is none.

@@ -14,6 +14,7 @@
 #include "data/datafile.h"
 #include "data/import_unit.h"
 #include "geometry/cart.h"
+#include "platform/item_types.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -30,7 +31,8 @@ class Import {
 
  private:
   std::string FindBand();
-  std::string WhyOwnCellsWillNotDo() const;
+  /// Puts the values on the cells of the raster itself; why that will not do, or nothing.
+  std::string TakeOwnGeometry();
   std::string TakeOwnCells();
   std::string PutOnGrid();
   std::string CompareProjections(std::unique_ptr<CYbProjectionChange>& change);
@@ -63,22 +65,18 @@ std::string Import::FindBand() {
                            : fmt::format("{}: there is no band {}, but {}", path_, wanted_.band, names);
 }
 
-std::string Import::WhyOwnCellsWillNotDo() const {
+std::string Import::TakeOwnGeometry() {
   const FileGeometry& geometry = file_.Facts().geometry;
-  constexpr double kSame = 1e-6;
   if (!geometry.IsPlaced()) return "it has no place on the map; give it one by a world file beside it";
   if (geometry.isGeographical) return "its cells are in degrees, those of a model in meters; put it on a model grid";
-  if (std::abs(geometry.cellHeight - geometry.cellSize) > kSame * geometry.cellSize) {
-    return fmt::format("its cells of {} x {} m are no squares; put it on a model grid",
-                       ShortestNumber(geometry.cellSize), ShortestNumber(geometry.cellHeight));
-  }
+  if (const std::string reason = ToModelGrid(geometry, geometry_); !reason.empty())
+    return fmt::format("it has {}; put it on a model grid", reason);
   return geometry_.Problem();
 }
 
 std::string Import::TakeOwnCells() {
   const FileGeometry& g = file_.Facts().geometry;
-  geometry_ = {g.nx, g.ny, g.cellSize, g.x0, g.y0, g.rotation, g.projection};
-  if (const std::string reason = WhyOwnCellsWillNotDo(); !reason.empty()) return fmt::format("{}: {}", path_, reason);
+  if (const std::string reason = TakeOwnGeometry(); !reason.empty()) return fmt::format("{}: {}", path_, reason);
   values_.resize(geometry_.CellCount());
   return file_.Read(band_->number, {0, 0, g.nx, g.ny}, values_);
 }
@@ -107,8 +105,8 @@ std::string Import::CompareProjections(std::unique_ptr<CYbProjectionChange>& cha
 bool Import::AreCodes() const {
   constexpr std::size_t kMostClasses = 100;
   constexpr int kPiece = 1 << 20;
-  if (wanted_.itemType == kCodeItemType) return true;
-  if (wanted_.itemType != kUndefinedItemType || !band_->isWhole) return false;
+  if (wanted_.itemType == quantity::kCode) return true;
+  if (wanted_.itemType != quantity::kUndefined || !band_->isWhole) return false;
   const FileGeometry& geometry = file_.Facts().geometry;
   const int rows = std::clamp(kPiece / geometry.nx, 1, geometry.ny);
   std::set<float> classes;
@@ -151,9 +149,9 @@ std::string Import::TakeUnitOfBand(const ItemType& type, NewItem& item) {
   if (!wanted_.unit.empty()) return TakeUnit(wanted_.unit, type, item, values_);
   // A code has no unit, whatever a raster says.
   const std::string reason =
-      TakeUnit(type.code == kCodeItemType ? std::string() : band_->unitText, type, item, values_);
+      TakeUnit(type.code == quantity::kCode ? std::string() : band_->unitText, type, item, values_);
   if (!reason.empty()) return fmt::format("{}: its unit: {}; name the right one", path_, reason);
-  if (band_->unitText.empty() && type.code != kUndefinedItemType && type.code != kCodeItemType) {
+  if (band_->unitText.empty() && type.code != quantity::kUndefined && type.code != quantity::kCode) {
     report_.notes.push_back(fmt::format("it names no unit: its values are taken as {}", BaseUnit(type).text));
   }
   return {};
@@ -166,7 +164,7 @@ std::string Import::CountValues(const ItemType& type) {
       continue;
     }
     ++report_.values;
-    if (type.code == kCodeItemType && value != std::trunc(value)) {
+    if (type.code == quantity::kCode && value != std::trunc(value)) {
       return fmt::format("{}: {} is no code: whole numbers were expected", path_, ShortestNumber(value));
     }
   }

@@ -15,6 +15,7 @@
 #include "data/grid_files.h"
 #include "geometry/grid_polygons.h"
 #include "geometry/shapes.h"
+#include "platform/item_types.h"
 #include "platform/text.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"
@@ -70,13 +71,15 @@ class DomainMeans {
         item_(file.Items()[static_cast<std::size_t>(number - 1)]),
         watched_(watched),
         wasMissing_(wasMissing) {
-    const FileGeometry& g = item_.geometry;
-    places_ = PlacesOf(domain, {g.nx, g.ny, g.IsPlaced() ? g.cellSize : 1.0, g.x0, g.y0, g.rotation, g.projection});
+    GridGeometry grid;
+    problem_ = ToModelGrid(item_.geometry, grid);
+    if (problem_.empty()) places_ = PlacesOf(domain, grid);
     wasMissing_.assign(places_.size(), false);
     values_.resize(item_.CellsOfLayer());
   }
 
   std::string Read(std::size_t step, double& mean) {
+    if (!problem_.empty()) return problem_;
     const ValueSelection selection{number_, step, 1, item_.dimensions == 3 ? std::optional(0) : std::nullopt};
     if (std::string error = file_.Read(selection, values_, item_.itemType); !error.empty()) return error;
     const bool isWatched =
@@ -105,6 +108,7 @@ class DomainMeans {
   std::vector<bool>& wasMissing_;
   std::vector<std::ptrdiff_t> places_;  ///< Of each cell of the domain in the file's grid; -1 off it.
   std::vector<float> values_;
+  std::string problem_;  ///< Why the file's cells are no grid of a model.
 };
 
 /// Codes of the areas of stations or zones, over the cells of the domain.
@@ -334,7 +338,8 @@ void BoardMaker::TakeMissing(CoverageRow& row, const std::vector<bool>& isMissin
   for (std::size_t i = 0; i < marks.size(); ++i)
     if (!board_.domain->IsEmptyValue(board_.domain->Values()[i])) marks[i] = isMissing[cell++] ? 2.0F : 1.0F;
   auto grid = std::make_shared<GridData>();
-  if (grid->TakeValues(board_.domain->Geometry(), std::move(marks), kUsualDeleteValue, kWholeNumberUnit, kCodeItemType)
+  if (grid->TakeValues(board_.domain->Geometry(), std::move(marks), kUsualDeleteValue, kWholeNumberUnit,
+                       quantity::kCode)
           .empty())
     row.missingCells = std::move(grid);
 }

@@ -30,11 +30,10 @@ FilePlace PlaceOfItem(const std::string& path, int number) {
   if (!item || item->dimensions < 2) return place;
   place.isUnplaced = !item->geometry.IsPlaced();
   if (place.isUnplaced) return place;
-  const FileGeometry& g = item->geometry;
   place.isKnown = true;
-  place.extent = EnvelopeOf({g.nx, g.ny, g.cellSize, g.x0, g.y0, g.rotation, {}});
-  place.isGeographical = g.isGeographical;
-  place.projection = g.projection;
+  place.extent = EnvelopeOf(item->geometry);
+  place.isGeographical = item->geometry.isGeographical;
+  place.projection = item->geometry.projection;
   return place;
 }
 
@@ -80,7 +79,7 @@ FilePlace PlaceOf(const FileUse& use) {
 }
 
 std::optional<GridGeometry> DomainGeometryOf(const CYbSEKvfBase& node) {
-  const auto* domain = node.Important<CCatchmentKvf>("CATCHMENT");
+  const auto* domain = node.Important(kDomain);
   if (!domain || !domain->HasGeometry()) return std::nullopt;
   return domain->GetModelGeometry();
 }

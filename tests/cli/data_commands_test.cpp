@@ -278,7 +278,7 @@ TEST(DataCommands, ARasterThatIsRefusedWritesNothing) {
       {{raster, "--item", "999", "--like", elsewhere}, "it has no value within the model grid"},
       {{bands, "--item", "999"}, "it has the bands 1 \"dry\", 2 \"bands 2\": tell which"},
       {{bands, "--item", "100180", "--band", "2"}, "\"frogs\" is no known unit; name the right one"},
-      {{flat, "--item", "999"}, "its cells of 2 x 1 m are no squares"},
+      {{flat, "--item", "999"}, "it has cells of 2 x 1, square ones were expected; put it on a model grid"},
       {{degrees, "--item", "999"}, "its cells are in degrees"},
       {{nowhere, "--item", "999"}, "it has no place on the map"},
       {{folder.File("none.tif"), "--item", "999"}, "it does not exist"},

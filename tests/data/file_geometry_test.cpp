@@ -86,5 +86,37 @@ TEST(FileGeometry, SpacingIsFoundOrTheFirstUnevenValueNamed) {
   }
 }
 
+TEST(FileGeometry, BecomesTheGridOfAModelWhereItsCellsAreSquares) {
+  const auto geometry = [](double cellSize, double cellHeight) {
+    FileGeometry file;
+    file.nx = 4;
+    file.ny = 3;
+    file.cellSize = cellSize;
+    file.cellHeight = cellHeight;
+    file.x0 = 1000;
+    file.rotation = 90;
+    return file;
+  };
+  const struct {
+    FileGeometry file;
+    double cellSize;
+    const char* reason;
+  } cases[] = {
+      {geometry(50, 50), 50, ""},
+      {geometry(50, 50.01), 50, ""},  // But for what rounding loses.
+      {geometry(50, 25), 0, "cells of 50 x 25, square ones were expected"},
+      {geometry(0, 0), 1, ""},  // Without a place.
+  };
+  for (const auto& c : cases) {
+    GridGeometry grid;
+    EXPECT_EQ(ToModelGrid(c.file, grid), c.reason);
+    if (*c.reason == '\0') {
+      EXPECT_EQ(grid, (GridGeometry{4, 3, c.cellSize, 1000, 0, 90, {}}));
+    }
+  }
+  // Its extent is known all the same.
+  EXPECT_EQ(EnvelopeOf(geometry(50, 25)), (Envelope{925, 0, 1000, 200}));
+}
+
 }  // namespace
 }  // namespace tervane
