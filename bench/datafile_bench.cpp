@@ -21,6 +21,7 @@
 #include "bench/median_table.h"
 #include "data/datafile.h"
 #include "data/datafile_writer.h"
+#include "platform/item_types.h"
 
 namespace tervane::bench {
 
@@ -52,7 +53,7 @@ int WriteOurs(const std::string& path, const std::vector<float>& values, std::si
   NewDataFile content;
   content.geometry.nx = content.geometry.ny = kSide;
   content.geometry.cellSize = 50;
-  content.items = {{"Elevation", 100180, 1000, {}}};
+  content.items = {{"Elevation", quantity::kElevation, 1000, {}}};
   DataFileWriter writer;
   Tell(writer.Create(path, content));
   for (std::size_t step = 0; step < steps; ++step) {

@@ -21,6 +21,7 @@
 #include "geometry/grid.h"
 #include "geometry/grid_interpolation.h"
 #include "geometry/grid_polygons.h"
+#include "platform/item_types.h"
 #include "spatial/domain_boundary.h"
 
 namespace tervane::bench {
@@ -214,7 +215,7 @@ double NumpyUnique(const std::vector<float>& values, std::size_t& count) {
 
 double OwnUnique(const std::vector<float>& values, std::size_t& count) {
   CTvn2DOrthoRotatedGridData grid;
-  if (const std::string problem = grid.TakeValues(kLarge, values, kEmpty, 0, kCodeItemType); !problem.empty())
+  if (const std::string problem = grid.TakeValues(kLarge, values, kEmpty, 0, quantity::kCode); !problem.empty())
     return -1;
   std::vector<double> times;
   std::vector<unsigned> codes;
@@ -267,7 +268,7 @@ void PrintTrace() {
     int isTraced = 1;
     for (int k = 0; k < 5; ++k) {
       CGeoDataBoundCondCatchmentData domain;
-      if (!domain.TakeValues(kLarge, values, kUsualDeleteValue, 0, kCodeItemType).empty()) return;
+      if (!domain.TakeValues(kLarge, values, kUsualDeleteValue, 0, quantity::kCode).empty()) return;
       const std::clock_t start = std::clock();
       isTraced = domain.PrepareBoundary(message);
       times.push_back(1000.0 * static_cast<double>(std::clock() - start) / CLOCKS_PER_SEC);

@@ -22,6 +22,7 @@
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "geometry/grid_interpolation.h"
+#include "platform/item_types.h"
 #include "shell/charts/series_plot.h"
 #include "shell/editors/data_viewer.h"
 #include "shell/maps/map_canvas.h"
@@ -49,8 +50,8 @@ std::shared_ptr<const CTvn2DOrthoRotatedGridData> LargeGrid(double rotation, boo
   }
   auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
   const GridGeometry geometry{kSide, kSide, 25, 400000, 5000000, rotation, {}};
-  const std::string problem = isCodes ? grid->TakeValues(geometry, values, -9999, kWholeNumberUnit, kCodeItemType)
-                                      : grid->TakeValues(geometry, values, -9999, 1000, 100180);
+  const std::string problem = isCodes ? grid->TakeValues(geometry, values, -9999, kWholeNumberUnit, quantity::kCode)
+                                      : grid->TakeValues(geometry, values, -9999, 1000, quantity::kElevation);
   if (!problem.empty()) fmt::print("no grid: {}\n", problem);
   return grid;
 }
@@ -122,7 +123,8 @@ void MeasureInterpolation() {
           options.progress = progress;
           std::vector<float> values;
           FileResult result = Interpolate(points, geometry, -9999, options, values);
-          if (result.Ok()) result.error = grid.TakeValues(geometry, std::move(values), -9999, 1000, 100180);
+          if (result.Ok())
+            result.error = grid.TakeValues(geometry, std::move(values), -9999, 1000, quantity::kElevation);
           return result;
         });
   };
@@ -165,7 +167,7 @@ void MeasureViewer() {
   NewDataFile content;
   content.geometry.nx = content.geometry.ny = kCells;
   content.geometry.cellSize = 50;
-  content.items = {{"Head", 100180, 1000, {}}};
+  content.items = {{"Head", quantity::kElevation, 1000, {}}};
   DataFileWriter writer;
   std::string error = writer.Create(path, content);
   std::vector<float> values(static_cast<std::size_t>(kCells) * kCells);

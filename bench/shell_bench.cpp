@@ -29,6 +29,7 @@
 #include "shell/program.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
+#include "simspec/basic_parameters.h"
 #include "simspec/extra_params.h"
 #include "simspec/titles.h"
 
@@ -113,7 +114,7 @@ void MeasureChanges(MainWindow& window, const std::string& setup, double limit) 
   DocumentFrame& frame = *window.Frame();
   frame.GoToPath("SimSpec/SimTitle");
   Settle(window);
-  auto& title = *frame.Session().Document().Root().GetImportantNode("BASICPARAMETERS")->Child<CSimTitleKvf>();
+  auto& title = *frame.Session().Document().Root().Important(kBasicParameters)->Child<CSimTitleKvf>();
   int number = 0;
   const auto change = [&] {
     title.Title = std::to_string(++number);

@@ -19,7 +19,7 @@ namespace {
 bool FindModelGrid(const std::string& setup, GridGeometry& geometry, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, setup, streams)) return false;
-  const auto* domain = dynamic_cast<const CCatchmentKvf*>(document.Root().GetImportantNode("CATCHMENT"));
+  const auto* domain = document.Root().Important(kDomain);
   geometry = domain->GetModelGeometry();
   if (domain->Type != CCatchmentKvf::kGridFile) return true;
   const FileResult result =

@@ -192,7 +192,7 @@ class CTvnDependentList : public NodeBase, public ListBase {
   }
 
  private:
-  ListBase* Master() const { return this->template Important<ListBase>(masterName_); }
+  ListBase* Master() const { return dynamic_cast<ListBase*>(this->ImportantNode(masterName_)); }
 
   template <class Visit>
   static void ForEachEntry(const CYbSEKvfBase& node, const Visit& visit) {

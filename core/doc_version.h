@@ -26,5 +26,6 @@ class CFlowModelDocVersionKvf : public CTvnKvfBase {
       keys.WriteOnly("Version", kWrittenVersion);
   }
 };
+inline constexpr ImportantName<CFlowModelDocVersionKvf> kDocVersion{"DOCVERSION"};
 
 }  // namespace tervane

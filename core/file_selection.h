@@ -22,7 +22,7 @@ class YbSESelection : public CTvnKvfBase {
   void ExchangeKeys(KeyExchange& keys) override {
     keys("FILE_NAME", File);
     int count = static_cast<int>(Items.size());
-    keys("ITEM_COUNT", count);
+    keys("ITEM_COUNT", count).HeldIn(nullptr);
     keys.Several("ITEM_NUMBERS", Items);
     // A file with fewer values than it counts has what it has.
     if (keys.IsReading() && count >= 0 && static_cast<std::size_t>(count) < Items.size())

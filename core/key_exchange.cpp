@@ -3,11 +3,13 @@
 #include "core/key_exchange.h"
 
 #include <algorithm>
+#include <cmath>
 
 #include <fmt/format.h>
 
 #include "core/kvf_writer.h"
 #include "core/list.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -50,6 +52,20 @@ KeyExchange KeyExchange::Restoring(StateBuffer& state) {
   return keys;
 }
 
+KeyExchange KeyExchange::Checking(StrayReport report) {
+  KeyExchange keys;
+  keys.report_ = std::move(report);
+  keys.docVersion_ = KeyInfo::kNoLimit;
+  return keys;
+}
+
+void KeyExchange::Finish() {
+  if (!report_ || checked_.key.empty()) return;
+  if (std::string text = WhyStray(checked_.facts, checked_.value); !text.empty())
+    report_(Trimmed(checked_.key), std::move(text), std::isfinite(checked_.value));
+  checked_ = {};
+}
+
 bool KeyExchange::Reads(const Rule& rule) {
   if (docVersion_ >= rule.since && docVersion_ <= rule.until) return true;
   kvfMarkKnown(section_, rule.key);
@@ -59,12 +75,18 @@ bool KeyExchange::Reads(const Rule& rule) {
 void KeyExchange::Describe(const Rule& rule, std::string_view type, const void* member) {
   const KvfNode* keyword = file_->currentKeyword;
   if (!keyword) return;
-  keys_->push_back({std::string(rule.key), std::string(type), rule.written ? KvfValuesText(*keyword) : std::string(),
-                    rule.since, rule.until, rule.written, member});
+  keys_->push_back({.key = std::string(rule.key),
+                    .type = std::string(type),
+                    .defaultValue = rule.written ? KvfValuesText(*keyword) : std::string(),
+                    .since = rule.since,
+                    .until = rule.until,
+                    .written = rule.written,
+                    .member = member});
 }
 
 template <class Value>
 void KeyExchange::Several(std::string_view key, std::vector<Value>& values) {
+  if (report_) return Finish();
   if (state_) return void(ExchangeState({key}, values));
   if (IsReading()) {
     const KvfNode* keyword = kvfKeywordByNameNum(section_, key, 1);
@@ -89,6 +111,7 @@ template void KeyExchange::Several(std::string_view key, std::vector<int>& value
 template void KeyExchange::Several(std::string_view key, std::vector<std::string>& values);
 
 void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
+  if (report_) return Finish();
   if (state_) return void(ExchangeState({key}, value));
   int year = value.Year(), month = value.Month(), day = value.Day();
   if (IsReading()) {
@@ -103,6 +126,7 @@ void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
 }
 
 void KeyExchange::Count(std::string_view key, CYbSEKvfListBaseInterface& list) {
+  if (report_) return Finish();
   if (state_) return;
   if (IsReading()) {
     list.ReadItemCount(section_, key);
@@ -110,6 +134,7 @@ void KeyExchange::Count(std::string_view key, CYbSEKvfListBaseInterface& list) {
   }
   int count = list.GetChildCount();
   Exchange({key}, count);
+  Declared().HeldIn(nullptr);
 }
 
 bool KeyExchange::Read(std::string_view key, FileName& value) {

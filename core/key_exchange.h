@@ -2,12 +2,14 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <functional>
 #include <limits>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "core/file_name.h"
+#include "core/key_facts.h"
 #include "core/kvf.h"
 #include "core/state_buffer.h"
 #include "platform/dates.h"
@@ -26,7 +28,50 @@ struct KeyInfo {
   int since = -1;                ///< First document version in which the key is read.
   int until = kNoLimit;          ///< Last document version in which the key is read.
   bool written = true;           ///< False for keys of old files.
-  const void* member = nullptr;  ///< Address of the member that holds the value; of a passing value, no member's.
+  const void* member = nullptr;  ///< The member that holds the value; null where none does.
+  int inFile = 0;                ///< How much higher a whole number is in the file than in the member.
+  KeyFacts facts = {};
+};
+
+/// A key that was just declared, for what is told behind it: `keys("Method", Method).OneOf(kMethods)`. Each of the
+/// walks takes of it what it needs.
+class DeclaredKey {
+ public:
+  /// The choices must outlive the declaration: a constant beside their enumeration.
+  DeclaredKey& OneOf(KeyChoices choices) {
+    return Tell([&](KeyFacts& facts) { facts.choices = choices; });
+  }
+  /// The file holds the base unit of the quantity.
+  DeclaredKey& Quantity(int itemType) {
+    return Tell([&](KeyFacts& facts) { facts.itemType = itemType; });
+  }
+  /// A unit that never changes.
+  DeclaredKey& Unit(std::string_view text) {
+    return Tell([&](KeyFacts& facts) { facts.unit = text; });
+  }
+  DeclaredKey& Range(double least, double greatest) {
+    return Tell([&](KeyFacts& facts) { facts.least = least, facts.greatest = greatest; });
+  }
+  DeclaredKey& AtLeast(double least) { return Range(least, std::numeric_limits<double>::infinity()); }
+  /// The member in which the node holds a value that is read and written through functions.
+  DeclaredKey& HeldIn(const void* member) {
+    if (member_) *member_ = member;
+    return *this;
+  }
+
+ private:
+  friend class KeyExchange;
+  DeclaredKey() = default;
+  DeclaredKey(KeyFacts* facts, const void** member) : facts_(facts), member_(member) {}
+
+  template <class Change>
+  DeclaredKey& Tell(const Change& change) {
+    if (facts_) change(*facts_);
+    return *this;
+  }
+
+  KeyFacts* facts_ = nullptr;
+  const void** member_ = nullptr;
 };
 
 /// One walk over the keys of a node. A node declares its keys once, in `ExchangeKeys`, in the order of the file; the
@@ -44,6 +89,12 @@ class KeyExchange {
   static KeyExchange Keeping(StateBuffer& state);
   static KeyExchange Restoring(StateBuffer& state);
 
+  /// Holds every number against what its declaration tells. `report` gets what is wrong, as a sentence; `isNumber` is
+  /// false for a value that is no number at all. The walk ends with `Finish`.
+  using StrayReport = std::function<void(std::string_view key, std::string text, bool isNumber)>;
+  static KeyExchange Checking(StrayReport report);
+  void Finish();
+
   bool IsReading() const { return section_ != nullptr || isRestoring_; }
   bool IsWriting() const { return file_ != nullptr && !keys_; }
   bool IsDescribing() const { return keys_ != nullptr; }
@@ -53,13 +104,17 @@ class KeyExchange {
   KvfNode* Section() const { return section_; }
 
   template <class Value>
-  void operator()(std::string_view key, Value& value) {
+  DeclaredKey operator()(std::string_view key, Value& value) {
     Exchange({key}, value);
+    return Declared();
   }
 
   /// `keys.Since(7)("Key", member)`: read in documents of version 7 and up, always written.
   auto Since(int version) {
-    return [this, version](std::string_view key, auto& value) { Exchange({.key = key, .since = version}, value); };
+    return [this, version](std::string_view key, auto& value) {
+      Exchange({.key = key, .since = version}, value);
+      return Declared();
+    };
   }
   /// A key of old files: read in documents up to that version, never written. True when it was read.
   template <class Value>
@@ -73,24 +128,30 @@ class KeyExchange {
   template <class Value>
   void WriteOnly(std::string_view key, Value value) {
     Exchange({.key = key, .since = KeyInfo::kNoLimit}, value);
+    Declared().HeldIn(nullptr);
   }
   /// Counted from 1 in the file and from 0 in memory.
-  void FromOne(std::string_view key, int& value) {
+  DeclaredKey FromOne(std::string_view key, int& value) {
+    if (report_) return (*this)(key, value);
     // Unsigned, since a file may hold the lowest number.
     int inFile = static_cast<int>(static_cast<unsigned>(value) + 1U);
     if (Exchange({key}, inFile)) value = static_cast<int>(static_cast<unsigned>(inFile) - 1U);
+    if (keys_) keys_->back().inFile = 1;
+    return Declared().HeldIn(&value);
   }
   /// An absent key reads as 0, false or an empty text.
   template <class Value>
-  void OrZero(std::string_view key, Value& value) {
+  DeclaredKey OrZero(std::string_view key, Value& value) {
     if (IsReading()) value = Value{};
     Exchange({key}, value);
+    return Declared();
   }
   /// A value that is not a member: `get()` gives it for the file, `set(value)` takes it when the file has the key.
   template <class Get, class Set>
-  void Custom(std::string_view key, const Get& get, const Set& set) {
+  DeclaredKey Custom(std::string_view key, const Get& get, const Set& set) {
     auto value = get();
     if (Exchange({key}, value)) set(value);
+    return Declared().HeldIn(nullptr);
   }
   /// All parameters of one keyword, whole numbers or texts. One of another type leaves the values as they were.
   template <class Value>
@@ -113,6 +174,7 @@ class KeyExchange {
   /// True when a value was read.
   template <class Value>
   bool Exchange(const Rule& rule, Value& value) {
+    if (report_) return Check(rule, value);
     if (state_) return ExchangeState(rule, value);
     if (IsReading()) return Reads(rule) && Read(rule.key, value);
     if (IsWriting() && !rule.written) return false;
@@ -131,6 +193,21 @@ class KeyExchange {
   /// Whether the rule reads its key in this document; a key that is skipped is marked as known.
   bool Reads(const Rule& rule);
   void Describe(const Rule& rule, std::string_view type, const void* member);
+  /// The key of which was just spoken; nothing is told of it but in describing.
+  DeclaredKey Declared() {
+    if (report_) return {&checked_.facts, &checked_.member};
+    return keys_ && !keys_->empty() ? DeclaredKey(&keys_->back().facts, &keys_->back().member) : DeclaredKey();
+  }
+
+  /// The number is judged when the next one comes, since its facts are told behind it.
+  template <class Value>
+  bool Check(const Rule& rule, const Value& value) {
+    Finish();
+    if constexpr (std::is_same_v<Value, int> || std::is_floating_point_v<Value>) {
+      if (rule.written && rule.since != KeyInfo::kNoLimit) checked_ = {rule.key, static_cast<double>(value), {}, {}};
+    }
+    return false;
+  }
 
   template <class Number>
   bool Read(std::string_view key, Number& value) {
@@ -158,6 +235,13 @@ class KeyExchange {
   std::vector<KeyInfo>* keys_ = nullptr;
   StateBuffer* state_ = nullptr;
   bool isRestoring_ = false;
+  StrayReport report_;
+  struct {
+    std::string_view key;  ///< Empty while there is nothing to judge.
+    double value = 0;
+    KeyFacts facts;
+    const void* member = nullptr;
+  } checked_;
   std::shared_ptr<KvfFile> scratch_;  ///< Takes the values that are described.
   int docVersion_ = -1;
 };

@@ -107,7 +107,9 @@ int CYbSEKvfBase::GetNumberWhatAmI() const {
 }
 
 KvfNode* CYbSEKvfBase::FindSection(KvfNode* parentSection) const {
-  return kvfSectionByNameNum(parentSection, FormattedSectionName(), sectionInstance_);
+  const bool isOld = !oldSection_.name.empty() && (root_ ? root_->ReadDocVersion() : -1) <= oldSection_.lastVersion;
+  const std::string name = isOld ? std::string(oldSection_.name) : FormattedSectionName();
+  return kvfSectionByNameNum(parentSection, name, sectionInstance_);
 }
 
 void CYbSEKvfBase::SetHelp(std::string helpFile, std::string page) {
@@ -130,14 +132,6 @@ void CYbSEKvfBase::Load(KvfNode* parentSection) {
   LoadSize(section);
   ReadData(section);
   LoadChildren(section);
-}
-
-void CYbSEKvfBase::LoadRenamed(int lastVersion, std::string oldName, KvfNode* parentSection) {
-  const bool isOld = (root_ ? root_->ReadDocVersion() : -1) <= lastVersion;
-  std::string name = sectionName_;
-  if (isOld) sectionName_ = std::move(oldName);
-  CYbSEKvfBase::Load(parentSection);
-  sectionName_ = std::move(name);
 }
 
 void CYbSEKvfBase::ReadTouched(KvfNode* section) {
@@ -230,15 +224,24 @@ int CYbSEKvfBase::Validate() {
   valid_ = 1;
   if (!HoldsSetup()) return valid_;
   if (IsDataUsedInSetup()) {
-    valid_ = ValidateData() != 0 && std::none_of(findings_.begin(), findings_.end(), [](const Finding& finding) {
-               return finding.severity == Severity::Error;
-             });
+    const bool isValid = ValidateData() != 0;
+    CheckValues();
+    valid_ = isValid && std::none_of(findings_.begin(), findings_.end(),
+                                     [](const Finding& finding) { return finding.severity == Severity::Error; });
   }
   for (const auto& property : properties_)
     if (!property->Validate()) valid_ = 0;
   for (std::size_t place = 0; place < children_.size(); ++place)
     if (!children_[place]->Validate()) valid_ = 0;
   return valid_;
+}
+
+void CYbSEKvfBase::CheckValues() {
+  KeyExchange keys = KeyExchange::Checking([this](std::string_view key, std::string text, bool isNumber) {
+    isNumber ? AddWarning(std::move(text), std::string(key)) : AddError(std::move(text), std::string(key));
+  });
+  ExchangeKeys(keys);
+  keys.Finish();
 }
 
 void CYbSEKvfBase::SetRevalidateAll() {
@@ -350,8 +353,9 @@ CYbSEKvfBase* FindNode(CYbSEKvfBase& root, const std::vector<PathStep>& steps) {
   return node;
 }
 
-std::string ClassNameOf(const CYbSEKvfBase& node) {
-  std::string name = os::DemangledName(typeid(node));
+std::string CYbSEKvfBase::ClassName() const {
+  if (!className_.empty()) return std::string(className_);
+  std::string name = os::DemangledName(typeid(*this));
   const std::size_t scope = name.rfind("::");
   return scope == std::string::npos ? name : name.substr(scope + 2);
 }

@@ -13,6 +13,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "core/condition.h"
 #include "core/key_exchange.h"
 #include "core/kvf.h"
 #include "core/page_class.h"
@@ -44,6 +45,13 @@ struct OverviewLine {
   std::string text;
 };
 
+/// The name under which a node is found from anywhere in its tree, with what it is found as: the node's class, or a
+/// narrow class for those who stand below it. Declared once, beside that class.
+template <class Node>
+struct ImportantName {
+  std::string_view text;
+};
+
 /// A node. Owns its children; knows its parent, which outlives it.
 class CYbSEKvfBase {
  public:
@@ -64,6 +72,9 @@ class CYbSEKvfBase {
     AddChild(std::move(node));
     return child;
   }
+  /// The same for a child that others find by a name.
+  template <class Node, class FoundAs, class... Arguments>
+  Node* NewImportantChild(ImportantName<FoundAs> name, Arguments&&... arguments);
   void AddChild(std::shared_ptr<CYbSEKvfBase> child);
   /// Takes a child (also a list's item) out of the walk; it stays alive with the caller, who must not keep it longer
   /// than the tree, and registered. Null when the node is no child.
@@ -98,10 +109,10 @@ class CYbSEKvfBase {
   std::uint64_t Serial() const { return serial_; }
   /// The root of the tree; null in a tree without one.
   CYbSEKvfGlobalBase* GetRoot() const { return root_; }
-  /// The node registered under that name as a `Node`, or null.
+  /// The node registered under that name, or null.
   template <class Node>
-  Node* Important(std::string_view name) const {
-    return dynamic_cast<Node*>(ImportantNode(name));
+  Node* Important(ImportantName<Node> name) const {
+    return dynamic_cast<Node*>(ImportantNode(name.text));
   }
 
   // ---- Section
@@ -120,6 +131,8 @@ class CYbSEKvfBase {
 
   virtual const std::string& GetTitle() const { return title_; }
   virtual void SetTitle(std::string title) { title_ = std::move(title); }
+  /// Name of the node's class; that of its type unless the node is one of several rows of one type.
+  std::string ClassName() const;
   virtual const std::string& GetAbbreviatedTitle() const { return abbreviatedTitle_; }
   virtual void SetAbbreviatedTitle(std::string title) { abbreviatedTitle_ = std::move(title); }
   void SetHelp(std::string helpFile, std::string page);
@@ -153,8 +166,14 @@ class CYbSEKvfBase {
 
   // ---- Taking part and validation
 
-  /// The node's own answer, from the model components.
-  virtual int IsDlgUsedInSetup() { return 1; }
+  /// The node's own answer, by its rule.
+  virtual int IsDlgUsedInSetup() { return takesPart_.Holds(*this); }
+  /// Its rule; one that always holds where the node has none.
+  const Condition& TakesPartRule() const { return takesPart_; }
+  /// The section bore another name in documents up to that version; a constant.
+  void SetOldSectionName(int lastVersion, std::string_view name) { oldSection_ = {lastVersion, name}; }
+  /// Sets the rule; a word behind the making of a child: `NewChild<...>(...)->TakesPartWhen(OwnEngine())`.
+  void TakesPartWhen(Condition rule) { takesPart_ = std::move(rule); }
   /// Whether the node takes part: its own answer and that of all nodes above it. Written to the file.
   virtual int IsDataUsedInSetup();
 
@@ -190,13 +209,13 @@ class CYbSEKvfBase {
   void AddWarning(std::string text, std::string key = {}, std::string detail = {});
   void AddFinding(Finding finding) { findings_.push_back(std::move(finding)); }
 
+  /// The name of a node that has no type of its own, but is a row of a table; a constant.
+  void SetClassName(std::string_view name) { className_ = name; }
   /// The page that the tree of the setup data shows.
   void SetPage(const PageClass& page) { setupPage_ = &page; }
   void SectionName(std::string name) { sectionName_ = std::move(name); }
   /// The node's section in the parent's section, marked as looked up; null when there is none.
   KvfNode* FindSection(KvfNode* parentSection) const;
-  /// Loads a node whose section bore another name in documents up to that version.
-  void LoadRenamed(int lastVersion, std::string oldName, KvfNode* parentSection);
   void LoadChildren(KvfNode* section);
   void SaveChildren(KvfFile* file);
   CYbSEKvfBase* ImportantNode(std::string_view name) const;
@@ -209,6 +228,8 @@ class CYbSEKvfBase {
   bool MissedSection(const CYbSEKvfBase& child) const { return child.missedSection_; }
 
  private:
+  /// Adds the findings for values that their keys do not allow.
+  void CheckValues();
   friend class CYbSEKvfGlobalBase;
   friend class UndoStack;
 
@@ -227,6 +248,12 @@ class CYbSEKvfBase {
   std::vector<Finding> findings_;
   std::vector<std::shared_ptr<CYbSEKvfBase>> properties_;
   std::string sectionName_, title_, abbreviatedTitle_, helpFile_, helpPage_;
+  Condition takesPart_;
+  std::string_view className_;  ///< Empty where the type tells it.
+  struct {
+    int lastVersion = -1;
+    std::string_view name;
+  } oldSection_;  ///< Without a name where the section had always the same.
   const PageClass* setupPage_ = nullptr;
 };
 
@@ -288,6 +315,15 @@ class CYbSEKvfGlobalBase : public CYbSEKvfBase {
   std::string setupFolder_;
   bool revalidateAll_ = false;
 };
+
+template <class Node, class FoundAs, class... Arguments>
+Node* CYbSEKvfBase::NewImportantChild(ImportantName<FoundAs> name, Arguments&&... arguments) {
+  static_assert(std::is_base_of_v<FoundAs, Node>);
+  Node* child = NewChild<Node>(std::forward<Arguments>(arguments)...);
+  // Parts of a tree stand alone in tests and in references.
+  if (root_) root_->RegisterImportantNode(child, name.text);
+  return child;
+}
 
 /// A rectangle of map coordinates; undefined when all four are exactly 0.
 struct DataArea {
@@ -362,6 +398,6 @@ int GenerateOverview(CYbSEKvfBase& root, std::vector<OverviewLine>& lines);
 std::string OverviewText(const std::vector<OverviewLine>& lines);
 
 /// Name of the node's class.
-std::string ClassNameOf(const CYbSEKvfBase& node);
+inline std::string ClassNameOf(const CYbSEKvfBase& node) { return node.ClassName(); }
 
 }  // namespace tervane

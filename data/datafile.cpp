@@ -15,6 +15,7 @@
 #include "data/netcdf.h"
 #include "data/raster_file.h"
 #include "platform/files.h"
+#include "platform/item_types.h"
 #include "platform/os.h"
 #include "platform/paths.h"
 
@@ -471,7 +472,7 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
     return refused(fmt::format("{} values were asked for, {} are there", values.size(), SizeOf(selection)));
   }
   std::optional<UnitConversion> conversion;
-  if (inBaseUnitOf && *inBaseUnitOf != kUndefinedItemType) {
+  if (inBaseUnitOf && *inBaseUnitOf != quantity::kUndefined) {
     const ItemType* wanted = FindItemType(*inBaseUnitOf);
     if (wanted == nullptr) return refused(fmt::format("there is no item type {}", *inBaseUnitOf));
     const Unit& base = BaseUnit(*wanted);

@@ -23,6 +23,7 @@
 #include "data/file_geometry.h"
 #include "geometry/grid.h"
 #include "platform/dates.h"
+#include "platform/item_types.h"
 #include "platform/progress.h"
 #include "platform/units.h"
 
@@ -44,7 +45,7 @@ std::string_view ValueTypeText(ValueType type);
 /// A variable of a data file.
 struct DataItem {
   std::string name;
-  int itemType = kUndefinedItemType;
+  int itemType = quantity::kUndefined;
   int unitKey = 0;                 ///< 0 when the unit is none of the table's.
   std::string unitText;            ///< As a person reads it.
   std::optional<UnitScale> scale;  ///< Nothing when nobody knows the unit.
@@ -126,7 +127,7 @@ class DataFile {
   /// Reads values in the order step, layer, row from the south, column from the west; the buffer must be as large as
   /// the selection. What the file marks as missing, what is not finite and what lies outside the file's own valid range
   /// is kDeleteValue. Values are in the file's unit, or, when an item type is given, in that item type's base unit;
-  /// kUndefinedItemType, which has none, leaves the file's unit. After an error, also "cancelled", the buffer holds
+  /// quantity::kUndefined, which has none, leaves the file's unit. After an error, also "cancelled", the buffer holds
   /// nothing of use.
   std::string Read(const ValueSelection& selection, std::span<float> values, std::optional<int> inBaseUnitOf = {},
                    ProgressPart progress = {}) const;

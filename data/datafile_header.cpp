@@ -10,6 +10,7 @@
 
 #include "data/cf_time.h"
 #include "data/netcdf.h"
+#include "platform/item_types.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -267,11 +268,11 @@ class HeaderReader {
     const int id = variable.id;
     item.name = TextAttribute(file_, id, "long_name");
     if (item.name.empty() || FirstInvalidUtf8(item.name)) item.name = variable.name;
-    item.itemType = IntAttribute(file_, id, "item_type").value_or(kUndefinedItemType);
+    item.itemType = IntAttribute(file_, id, "item_type").value_or(quantity::kUndefined);
     if (FindItemType(item.itemType) == nullptr) {
       notes_.push_back(fmt::format("the item {} has the item type {}, which is unknown: it is read as undefined",
                                    item.name, item.itemType));
-      item.itemType = kUndefinedItemType;
+      item.itemType = quantity::kUndefined;
     }
     if (std::string note = SetUnit(item, TextAttribute(file_, id, "units"), IntAttribute(file_, id, "unit_key"));
         !note.empty()) {
@@ -566,7 +567,7 @@ std::string SetUnit(DataItem& item, std::string unitText, std::optional<int> uni
     item.scale = parsed->scale;
     if (parsed->unit != nullptr) item.unitKey = parsed->unit->key;
   }
-  if (item.itemType == kUndefinedItemType) return {};
+  if (item.itemType == quantity::kUndefined) return {};
   const ItemType& type = *FindItemType(item.itemType);
   if (item.scale && item.scale->dimension == BaseUnit(type).scale.dimension) return {};
   return fmt::format("the item {} has the unit \"{}\", which is none of {}", item.name, item.unitText, type.name);

@@ -12,6 +12,7 @@
 
 #include "data/netcdf.h"
 #include "platform/files.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 
@@ -109,7 +110,7 @@ std::string WhyImpossible(const NewDataFile& content) {
     const Unit* unit = FindUnit(item.unitKey);
     if (unit == nullptr) return fmt::format("there is no unit {}", item.unitKey);
     // A value of undefined meaning may have any unit.
-    if (item.itemType != kUndefinedItemType && !AllowsUnit(*type, item.unitKey)) {
+    if (item.itemType != quantity::kUndefined && !AllowsUnit(*type, item.unitKey)) {
       return fmt::format("{} is no unit of {}", unit->text, type->name);
     }
   }

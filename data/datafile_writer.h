@@ -13,13 +13,14 @@
 
 #include "data/datafile.h"
 #include "platform/files.h"
+#include "platform/item_types.h"
 
 namespace tervane {
 
 /// An item of a new data file.
 struct NewItem {
   std::string name;
-  int itemType = kUndefinedItemType;
+  int itemType = quantity::kUndefined;
   int unitKey = kDimensionlessUnit;  ///< The unit of the values that will be put.
   ValueType valueType = ValueType::Instantaneous;
 };

@@ -7,6 +7,8 @@
 
 #include <fmt/format.h>
 
+#include "platform/item_types.h"
+
 namespace tervane {
 
 std::string TakeUnit(const std::string& text, const ItemType& type, NewItem& item, std::span<float> values) {
@@ -14,7 +16,7 @@ std::string TakeUnit(const std::string& text, const ItemType& type, NewItem& ite
   if (text.empty()) return {};
   const std::optional<ParsedUnit> unit = ParseUnit(text);
   if (!unit) return fmt::format("\"{}\" is no known unit", text);
-  if (unit->unit != nullptr && (AllowsUnit(type, unit->unit->key) || type.code == kUndefinedItemType)) {
+  if (unit->unit != nullptr && (AllowsUnit(type, unit->unit->key) || type.code == quantity::kUndefined)) {
     item.unitKey = unit->unit->key;
     return {};
   }

@@ -13,6 +13,7 @@
 #include "data/netcdf.h"
 #include "data/raster/raster_module.h"
 #include "geometry/cart.h"
+#include "platform/item_types.h"
 #include "platform/os.h"
 #include "platform/paths.h"
 #include "platform/text.h"
@@ -76,8 +77,8 @@ RasterBand BandOf(const raster::StoredBand& stored, int number, std::size_t coun
   }
   band.unitText = Trimmed(stored.unit);
   band.isWhole = stored.isWhole;
-  band.itemType = NumberOr(stored.itemType, kUndefinedItemType);
-  if (FindItemType(band.itemType) == nullptr) band.itemType = kUndefinedItemType;
+  band.itemType = NumberOr(stored.itemType, quantity::kUndefined);
+  if (FindItemType(band.itemType) == nullptr) band.itemType = quantity::kUndefined;
   band.unitKey = NumberOr(stored.unitKey, 0);
   if (FindUnit(band.unitKey) == nullptr) band.unitKey = 0;
   return band;
@@ -213,7 +214,7 @@ FileResult WriteGeoTiff(const std::string& path, const NewRaster& raster, std::s
   band.description = raster.name;
   const Unit* unit = FindUnit(raster.unitKey);
   band.unit = unit != nullptr ? std::string(unit->udunits.empty() ? unit->text : unit->udunits) : raster.unitText;
-  if (raster.itemType != kUndefinedItemType) band.itemType = std::to_string(raster.itemType);
+  if (raster.itemType != quantity::kUndefined) band.itemType = std::to_string(raster.itemType);
   if (raster.unitKey != 0) band.unitKey = std::to_string(raster.unitKey);
   try {
     std::vector<float> turned(values.size());

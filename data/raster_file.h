@@ -12,6 +12,7 @@
 
 #include "data/file_geometry.h"
 #include "platform/files.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
 
 namespace tervane {
@@ -21,8 +22,8 @@ struct RasterBand {
   std::string name;      ///< Never empty: the band's description, else the file's name, with the number if needed.
   std::string unitText;  ///< As the file names it; often empty.
   bool isWhole = false;  ///< Stored as whole numbers.
-  int itemType = kUndefinedItemType;  ///< Named in our own files.
-  int unitKey = 0;                    ///< Likewise; 0 when it is not named.
+  int itemType = quantity::kUndefined;  ///< Named in our own files.
+  int unitKey = 0;                      ///< Likewise; 0 when it is not named.
 };
 
 struct RasterFacts {
@@ -64,7 +65,7 @@ class RasterFile {
 struct NewRaster {
   FileGeometry geometry;
   std::string name;
-  int itemType = kUndefinedItemType;
+  int itemType = quantity::kUndefined;
   int unitKey = kDimensionlessUnit;
   std::string unitText;  ///< Where the unit is none of the table's, and `unitKey` 0.
 };

@@ -11,11 +11,12 @@
 #include "data/grid_resampling.h"
 #include "data/raster_file.h"
 #include "geometry/grid.h"
+#include "platform/item_types.h"
 
 namespace tervane {
 
 struct RasterImport {
-  int itemType = kUndefinedItemType;
+  int itemType = quantity::kUndefined;
   int band = 0;                          ///< Its number; 0 for the only one.
   std::string unit;                      ///< Of the raster's values; empty: what the raster says, else the base unit.
   std::optional<GridGeometry> grid;      ///< Where the values are to stand; without it on the raster's own cells.

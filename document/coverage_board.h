@@ -32,5 +32,6 @@ class CCoverageKvf : public CTvnKvfGroupBase {
   std::shared_ptr<Computed<CoverageBoard>> board_;
   std::shared_ptr<const CoverageBoard> latest_;  ///< The last that was computed.
 };
+inline constexpr ImportantName<CCoverageKvf> kCoverage{"COVERAGE"};
 
 }  // namespace tervane

@@ -32,11 +32,11 @@ void CFlowModelDoc::RunEngine(const std::string& argument) {
   SetExtraExecuteArgument(argument);
   SetEngine("Tvn_Simulation.exe");
   SetInputName(PathName());
-  const auto* flags = Root().Important<CExecuteEngineFlagsKvf>("EXECUTE_ENGINE_FLAGS");
+  const auto* flags = Root().Important(kExecuteFlags);
   const bool preprocesses = argument.empty() ? flags && flags->PP != 0 : argument == "/PP";
   SetReport(preprocesses ? ResolvedPath(PreprocessorReport(), {}) : std::string());
   if (ModelCompOf(Root()).River) {
-    if (const auto* river = Root().Important<RiverFiles>("River")) {
+    if (const auto* river = Root().Important(kRiver)) {
       const std::string file = river->GetFilename().Absolute();
       if (!file.empty()) SetExtraLog(file.substr(0, file.size() - ExtensionOf(file).size()) + "FvrProgress.log");
     }
@@ -61,7 +61,7 @@ std::string CFlowModelDoc::ResultFile(std::string_view stemEnd, std::string_view
 }
 
 CPreprocessedDataManager* CFlowModelDoc::AttachPreprocessorReport() const {
-  auto* processed = Root().Important<CProcDataKvf>("PROCESSED_DATA");
+  auto* processed = Root().Important(kProcessedData);
   if (!processed || PathName().empty()) return nullptr;
   processed->SetPath(ResolvedPath(PreprocessorReport(), {}));
   return processed->Manager();

@@ -29,34 +29,51 @@ namespace {
 
 /// A child of the root: the order of the rows is the order of the sections in the file.
 struct ChildRow {
-  CYbSEKvfBase* (*make)(CGlobal& root);
-  std::string_view importantName;  ///< Empty: nobody looks the node up.
+  void (*make)(CGlobal& root, std::string_view name);
+  std::string_view name;  ///< Under which others find it; empty where nobody looks it up.
 };
 
 template <class Node>
-CYbSEKvfBase* Make(CGlobal& root) {
-  return root.NewChild<Node>();
+void Make(CGlobal& root, std::string_view name) {
+  CYbSEKvfBase* child = root.NewChild<Node>();
+  if (!name.empty()) root.RegisterImportantNode(child, name);
+}
+
+template <auto make>
+void MakeBy(CGlobal& root, std::string_view name) {
+  CYbSEKvfBase* child = make(root);
+  if (!name.empty()) root.RegisterImportantNode(child, name);
+}
+
+template <class Node>
+constexpr ChildRow Child() {
+  return {Make<Node>, {}};
+}
+template <class Node, class FoundAs>
+constexpr ChildRow Child(ImportantName<FoundAs> name) {
+  static_assert(std::is_base_of_v<FoundAs, Node>);
+  return {Make<Node>, name.text};
 }
 
 constexpr std::array kChildren{
-    ChildRow{Make<CFlowModelDocVersionKvf>, "DOCVERSION"},
-    ChildRow{Make<CViewSettingsKvf>, "VIEWSETTINGS"},
-    ChildRow{Make<CIntroductionKvf>, ""},
-    ChildRow{Make<COverlaysKvf>, "OVERLAY_DATA"},
-    ChildRow{Make<CBasicParaKvf>, "BASICPARAMETERS"},
-    ChildRow{Make<CModelCompWQKvf>, "MODEL_COMP_WQ"},
-    ChildRow{Make<CModelCompPTKvf>, "MODEL_COMP_PT"},
-    ChildRow{Make<CCatchmentKvf>, "CATCHMENT"},
-    ChildRow{Make<CSubcatchmentKvf>, "SUBCATCHMENT"},
-    ChildRow{Make<CTopographyKvf>, "TOPOGRAPHY"},
-    ChildRow{Make<CPrecipitationRelatedKvf>, "PRECIPITATIONRELATED"},
-    ChildRow{Make<CEvapotransKvf>, "Evapotrans"},
-    ChildRow{Make<CDummySatZoneKvf>, ""},
-    ChildRow{Make<CExtraParamsKvf>, ""},
-    ChildRow{Make<CExecuteEngineFlagsKvf>, "EXECUTE_ENGINE_FLAGS"},
-    ChildRow{Make<CProcDataKvf>, "PROCESSED_DATA"},
-    ChildRow{Make<COverviewKvf>, "OVERVIEW"},
-    ChildRow{Make<CCoverageKvf>, "COVERAGE"},
+    Child<CFlowModelDocVersionKvf>(kDocVersion),
+    Child<CViewSettingsKvf>(kViewSettings),
+    Child<CIntroductionKvf>(),
+    Child<COverlaysKvf>(kOverlays),
+    Child<CBasicParaKvf>(kBasicParameters),
+    Child<CModelCompWQKvf>(kWaterQualityComponents),
+    Child<CModelCompPTKvf>(kParticleTrackingComponents),
+    Child<CCatchmentKvf>(kDomain),
+    Child<CSubcatchmentKvf>(kSubcatchments),
+    ChildRow{MakeBy<NewTopography>, kTopography.text},
+    Child<CPrecipitationRelatedKvf>(kClimate),
+    Child<CEvapotransKvf>(kOldEvapotranspiration),
+    ChildRow{MakeBy<NewGroundwaterTable>, {}},
+    Child<CExtraParamsKvf>(),
+    Child<CExecuteEngineFlagsKvf>(kExecuteFlags),
+    Child<CProcDataKvf>(kProcessedData),
+    Child<COverviewKvf>(kOverview),
+    Child<CCoverageKvf>(kCoverage),
 };
 
 // The reading order, in important names; a name that no node bears is passed over.
@@ -70,19 +87,16 @@ constexpr std::string_view kSaturatedZone = "SATZONE";
 /// In files of version 1 read by the basic parameters, inside their section.
 constexpr std::string_view kStoringResults = "STORINGRESULTS";
 /// Read from old files and never written.
-constexpr std::string_view kRetired = "Evapotrans";
+constexpr std::string_view kRetired = kOldEvapotranspiration.text;
 
 }  // namespace
 
 CGlobal::CGlobal() : CTvnKvfGlobalBase("TERVANE_FLOWMODEL") {
-  for (const ChildRow& row : kChildren) {
-    CYbSEKvfBase* child = row.make(*this);
-    if (!row.importantName.empty()) RegisterImportantNode(child, row.importantName);
-  }
+  for (const ChildRow& row : kChildren) row.make(*this, row.name);
 }
 
 int CGlobal::ReadDocVersion() const {
-  const auto* version = Important<CFlowModelDocVersionKvf>("DOCVERSION");
+  const auto* version = Important(kDocVersion);
   return version ? version->ReadVersion : -1;
 }
 

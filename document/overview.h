@@ -20,5 +20,6 @@ class COverviewKvf : public CTvnKvfBase {
 
   int IsDlgUsedInSetup() override { return 0; }
 };
+inline constexpr ImportantName<COverviewKvf> kOverview{"OVERVIEW"};
 
 }  // namespace tervane

@@ -16,5 +16,6 @@ class CViewSettingsKvf : public CTvnKvfBase {
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };
+inline constexpr ImportantName<CViewSettingsKvf> kViewSettings{"VIEWSETTINGS"};
 
 }  // namespace tervane

@@ -23,8 +23,8 @@ Tasks TasksOf(const std::string& option, const CFlowModelDoc& document) {
   if (option == "/PP") return {true, false, false};
   if (option == "/WM") return {false, true, false};
   if (option == "/WQ") return {false, false, true};
-  const auto* flags = document.Root().Important<CExecuteEngineFlagsKvf>("EXECUTE_ENGINE_FLAGS");
-  const auto* components = document.Root().Important<CModelCompKvf>("MODELCOMP");
+  const auto* flags = document.Root().Important(kExecuteFlags);
+  const auto* components = document.Root().Important(kModelComponents);
   if (!flags || !components) return {true, false, false};
   return {flags->PP != 0, flags->WM != 0, flags->WQ != 0 && components->WQ != 0};
 }

@@ -9,6 +9,7 @@
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "data/grid_resampling.h"
+#include "platform/item_types.h"
 
 namespace tervane {
 
@@ -61,7 +62,7 @@ bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, EngineOutput
       log.Error(grid.place, made.error);
       return false;
     }
-    const bool isCode = grid.itemType == kCodeItemType;
+    const bool isCode = grid.itemType == quantity::kCode;
     std::vector<float> values;
     if (const std::string problem = PutOnModel(source, domain.Geometry(), isCode, values); !problem.empty()) {
       log.Error(grid.place, problem);

@@ -12,6 +12,7 @@
 #include "data/datafile.h"
 #include "engine/engine_output.h"
 #include "geometry/grid.h"
+#include "platform/item_types.h"
 
 namespace tervane {
 
@@ -19,7 +20,7 @@ namespace tervane {
 struct ModelGrid {
   std::string title;
   std::string place;  ///< Path of the node, for messages.
-  int itemType = kUndefinedItemType;
+  int itemType = quantity::kUndefined;
   /// Makes the values, in the item type's base unit, on any grid in the model's plane.
   std::function<FileResult(CTvn2DOrthoRotatedGridData&)> make;
   std::function<std::string(int code)> nameOfCode;  ///< Of the zones of a quantity of codes.

@@ -11,6 +11,7 @@
 #include "data/datafile.h"
 #include "data/grid_files.h"
 #include "geometry/grid_polygons.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "simspec/periods.h"
@@ -77,8 +78,8 @@ FileResult MeanOfSteps(const std::string& path, int number, const CYbDateTime& s
 Preprocessor::Preprocessor(CFlowModelDoc& document, EngineOutput& log)
     : document_(document),
       log_(log),
-      catchment_(document.Root().Important<CCatchmentKvf>("CATCHMENT")),
-      period_(document.Root().Important<CSimPeriodKvf>("SIMPERIOD")),
+      catchment_(document.Root().Important(kDomain)),
+      period_(document.Root().Important(kSimulationPeriod)),
       grids_(ResolvedPath(ResultFileName(document.getResultFolder(),
                                          std::string(BaseNameOf(document.PathName())) + "_PreProcessed", ".nds2"),
                           {})) {}
@@ -160,7 +161,7 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
     page.title = station->GetStationName();
     const auto* owner = dynamic_cast<const C2DStationBasedDataKvf*>(station->GetParent());
     ShowSeries(station->TYPE == C2DStationBasedDataTimeSeriesKvf::kConstant, station->FIXED_VALUE,
-               owner ? owner->GetItemType() : kUndefinedItemType, station->SeriesFile(), page);
+               owner ? owner->GetItemType() : quantity::kUndefined, station->SeriesFile(), page);
   } else if (const auto* series = dynamic_cast<const CTimeseriesConstKvf*>(&node)) {
     const CGlobalKvf& global = series->Global();
     ShowSeries(global.TYPE == CGlobalKvf::kConstant, global.FIXED_VALUE, series->GetItemType(), global.SeriesFile(),
@@ -181,7 +182,7 @@ void Preprocessor::ShowDomain(ReportPage& page) {
     return FileResult{};
   };
   const auto nameOfCode = [](int code) { return std::string(code == 2 ? "outer boundary" : "inside"); };
-  ShowGrid({page.title, PathOf(*catchment_), kCodeItemType, copy, nameOfCode, {}, {}}, page);
+  ShowGrid({page.title, PathOf(*catchment_), quantity::kCode, copy, nameOfCode, {}, {}}, page);
 
   CGeoDataBoundCondCatchmentData boundary;
   std::string problem = boundary.TakeValues(domain_->Geometry(), domain_->Values(), domain_->DeleteValue(),
@@ -210,7 +211,7 @@ void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
     return BuildGrid(source, {}, grid);
   };
   ShowGrid({page.title, PathOf(quantity), itemType, std::move(make), {}, {}, {}}, page);
-  if (&quantity != document_.Root().GetImportantNode("TOPOGRAPHY")) return;
+  if (&quantity != document_.Root().Important(kTopography)) return;
   report_.topographyFile = grids_.Path();
   report_.topographyItem = static_cast<int>(grids_.Grids().size());
 }
@@ -262,7 +263,7 @@ void Preprocessor::ShowZoneMap(CFMSEKvfBase& owner, const GridSource& source, Re
       if (item->GetStationId() == id) return item->GetStationName();
     return id;
   };
-  ShowGrid({page.title, PathOf(owner), kCodeItemType, std::move(make), std::move(nameOfCode), {}, {}}, page);
+  ShowGrid({page.title, PathOf(owner), quantity::kCode, std::move(make), std::move(nameOfCode), {}, {}}, page);
 }
 
 // ---- Summary

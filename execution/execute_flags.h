@@ -25,5 +25,6 @@ class CExecuteEngineFlagsKvf : public CTvnKvfBase {
     keys("own water quality flag", WQ);
   }
 };
+inline constexpr ImportantName<CExecuteEngineFlagsKvf> kExecuteFlags{"EXECUTE_ENGINE_FLAGS"};
 
 }  // namespace tervane

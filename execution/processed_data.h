@@ -66,5 +66,6 @@ class CProcDataKvf : public CYbSEKvfBase {
  private:
   std::unique_ptr<CPreprocessedDataManager> manager_;
 };
+inline constexpr ImportantName<CProcDataKvf> kProcessedData{"PROCESSED_DATA"};
 
 }  // namespace tervane

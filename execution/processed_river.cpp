@@ -9,6 +9,7 @@
 
 #include <fmt/format.h>
 
+#include "platform/item_types.h"
 #include "platform/units.h"
 
 namespace tervane {
@@ -93,7 +94,7 @@ std::string ReadLinks(BinaryReader& reader, const Header& header,
   for (float& value : values) value = static_cast<float>(reader.Next<std::int32_t>());
   auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
   std::string problem =
-      grid->TakeValues(header.geometry, std::move(values), header.deleteValue, kWholeNumberUnit, kCodeItemType);
+      grid->TakeValues(header.geometry, std::move(values), header.deleteValue, kWholeNumberUnit, quantity::kCode);
   if (problem.empty()) links = std::move(grid);
   return problem;
 }

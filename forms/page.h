@@ -45,6 +45,7 @@ class CYbSEDlgBase {
   virtual ~CYbSEDlgBase() = default;
 
   CYbSEKvfBase& Node() const { return node_; }
+  const PageContext& Context() const { return context_; }
   Host& Outside() const { return context_.host; }
   /// For a form without a document: what follows each change.
   void FollowItself(std::function<void()> follow) {
@@ -86,7 +87,6 @@ class CYbSEDlgBase {
 
  protected:
   virtual void Describe(PageForm& form) = 0;
-  const PageContext& Context() const { return context_; }
 
  private:
   /// What follows a value that was taken.

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "forms/page_form.h"
 
+#include <algorithm>
 #include <array>
 #include <charconv>
 
@@ -26,8 +27,17 @@ int Control::Option() const {
   const std::string value = Text();
   int number = -1;
   const auto result = std::from_chars(value.data(), value.data() + value.size(), number);
-  const bool isOption = result.ec == std::errc() && number >= 0 && number < static_cast<int>(Options().size());
-  return isOption ? number : -1;
+  if (result.ec != std::errc()) return -1;
+  if (!optionValues.empty()) {
+    const auto found = std::ranges::find(optionValues, number);
+    return found == optionValues.end() ? -1 : static_cast<int>(found - optionValues.begin());
+  }
+  return number >= 0 && number < static_cast<int>(Options().size()) ? number : -1;
+}
+
+std::string Control::OptionValue(int option) const {
+  const bool isTold = option >= 0 && option < static_cast<int>(optionValues.size());
+  return std::to_string(isTold ? optionValues[static_cast<std::size_t>(option)] : option);
 }
 
 namespace {
@@ -41,10 +51,8 @@ std::string EnterInt(const std::string& typed, const std::function<void(int)>& s
 
 }  // namespace
 
-PageForm::PageForm(CYbSEKvfBase& node) : node_(node) {
-  std::vector<KeyInfo> described;
-  node.DescribeKeys(described);
-  for (const KeyInfo& key : described) keys_.emplace(key.member, Trimmed(key.key));
+PageForm::PageForm(CYbSEKvfBase& node, std::shared_ptr<BoundKeys> keys) : node_(node), keys_(std::move(keys)) {
+  keys_->Add(node);
 }
 
 Control& PageForm::Add(ControlKind kind, std::string label) {
@@ -57,7 +65,19 @@ Control& PageForm::Add(ControlKind kind, std::string label) {
 
 Control& PageForm::AddBound(ControlKind kind, std::string label, const void* member) {
   Control& control = Add(kind, std::move(label));
-  if (const auto found = keys_.find(member); found != keys_.end()) control.key = found->second;
+  const BoundKeys::Place* place = keys_->Find(member);
+  if (!place) return control;
+  control.node = place->node;
+  control.key = place->key;
+  control.unit = place->facts.unit;
+  control.itemType = place->facts.itemType;
+  std::vector<std::string> options;
+  for (const KeyChoice& choice : place->facts.choices) {
+    if (!choice.isOffered) continue;
+    options.emplace_back(choice.text);
+    control.optionValues.push_back(choice.value);
+  }
+  control.options = [options = std::move(options)] { return options; };
   return control;
 }
 
@@ -89,7 +109,10 @@ Control& PageForm::Radio(std::string label, int& value, std::vector<std::string>
 
 Control& PageForm::Choice(std::string label, int& value, std::vector<std::string> options) {
   Control& control = AddBound(ControlKind::Choice, std::move(label), &value);
-  control.options = [options = std::move(options)] { return options; };
+  if (!options.empty()) {
+    control.optionValues.clear();
+    control.options = [options = std::move(options)] { return options; };
+  }
   control.text = [&value] { return std::to_string(value); };
   control.enter = [&value](const std::string& typed) { return EnterValue(value, typed); };
   return control;
@@ -173,7 +196,10 @@ Control& PageForm::Number(std::string label, double& value, std::string format) 
 Control& PageForm::Date(std::string label, CYbDateTime& value) {
   Control& control = Date(
       std::move(label), [&value] { return value; }, [&value](const CYbDateTime& date) { value = date; });
-  if (const auto found = keys_.find(&value); found != keys_.end()) control.key = found->second;
+  if (const BoundKeys::Place* place = keys_->Find(&value)) {
+    control.node = place->node;
+    control.key = place->key;
+  }
   return control;
 }
 
@@ -258,9 +284,10 @@ Control& PageForm::Chart(std::function<SeriesContent()> content) {
   return control;
 }
 
-PageForm& PageForm::Group(std::string title) {
+PageForm& PageForm::Group(std::string title, Condition shownWhen) {
   Control& control = Add(ControlKind::Group, std::move(title));
-  control.group = std::make_shared<PageForm>(node_);
+  control.group = std::make_shared<PageForm>(node_, keys_);
+  control.ShownWhen(std::move(shownWhen));
   return *control.group;
 }
 

@@ -12,8 +12,10 @@
 #include <string_view>
 #include <vector>
 
+#include "core/condition.h"
 #include "core/host.h"
 #include "core/node.h"
+#include "forms/bound_keys.h"
 #include "forms/entry.h"
 #include "platform/dates.h"
 
@@ -62,6 +64,11 @@ enum class ControlKind {
 };
 std::string_view KindName(ControlKind kind);
 
+/// A condition of a page, over what it knows.
+inline Condition Sentence(std::string sentence, std::function<bool()> rule) {
+  return Condition::Sentence(std::move(sentence), [rule = std::move(rule)](const CYbSEKvfBase&) { return rule(); });
+}
+
 /// One control. Values travel as text, in the form in which they are shown and typed; options as their number.
 class Control {
  public:
@@ -72,7 +79,8 @@ class Control {
   int itemType = 0;                                   ///< The number is a quantity of that item type; 0 for none.
   const DisplayUnits* displayUnits = nullptr;         ///< The user's units; null for base units.
   std::function<std::vector<std::string>()> options;  ///< Of a radio group or drop list.
-  std::string key;                                    ///< Of the node, so that a finding leads here.
+  std::vector<int> optionValues;  ///< What the node stores for each; empty for the options' numbers.
+  std::string key;                ///< Of the node, so that a finding leads here.
   const CYbSEKvfBase* node = nullptr;
   Host::FileQuestion fileQuestion;    ///< Of a file name.
   std::string folder;                 ///< Of a page of a browser: where what it names lies.
@@ -84,7 +92,7 @@ class Control {
   std::function<bool(Host&)> browse;
   /// What a taken value brings with it; gives further hints of the change.
   std::function<int()> then;
-  std::function<bool()> enabledWhen, shownWhen;
+  Condition enabledWhen, shownWhen;
   bool beside = false;  ///< Stands in the same row as the control before it.
   int hint = kDataChanged;
   bool revalidates = false;         ///< Other nodes' rules depend on the value.
@@ -96,8 +104,8 @@ class Control {
   std::function<MapContent()> map;       ///< What a map shows now.
   std::function<SeriesContent()> chart;  ///< What a chart shows now.
 
-  bool IsEnabled() const { return !enabledWhen || enabledWhen(); }
-  bool IsShown() const { return !shownWhen || shownWhen(); }
+  bool IsEnabled() const { return enabledWhen.Holds(*node); }
+  bool IsShown() const { return shownWhen.Holds(*node); }
   std::string Text() const { return text ? text() : std::string(); }
   std::vector<std::string> Options() const { return options ? options() : std::vector<std::string>(); }
   FieldUnit NumberUnit() const { return {unit, itemType, displayUnits}; }
@@ -107,16 +115,27 @@ class Control {
   std::vector<UnitChoice> UnitChoices() const { return NumberUnit().Choices(); }
   /// The number of the chosen option, or -1 when the value is none of them.
   int Option() const;
+  /// The value to enter for an option.
+  std::string OptionValue(int option) const;
 
   // ---- Said behind the making of a control
 
-  Control& EnabledWhen(std::function<bool()> rule) { return enabledWhen = std::move(rule), *this; }
-  Control& ShownWhen(std::function<bool()> rule) { return shownWhen = std::move(rule), *this; }
+  Control& EnabledWhen(Condition rule) { return enabledWhen = std::move(rule), *this; }
+  Control& ShownWhen(Condition rule) { return shownWhen = std::move(rule), *this; }
+  /// The same where no condition over keys fits: a sentence that is true when the function says so.
+  Control& EnabledWhen(std::string sentence, std::function<bool()> rule) {
+    return EnabledWhen(Sentence(std::move(sentence), std::move(rule)));
+  }
+  Control& ShownWhen(std::string sentence, std::function<bool()> rule) {
+    return ShownWhen(Sentence(std::move(sentence), std::move(rule)));
+  }
   Control& Unit(std::string text_) { return unit = std::move(text_), *this; }
   /// The node stores the base unit of that item type; the number is shown and typed in the user's unit.
   Control& Quantity(int itemType_) { return itemType = itemType_, *this; }
   Control& Beside() { return beside = true, *this; }
+  /// The key of a control over functions, so that findings and search lead to it; of another node than the page's.
   Control& Key(std::string name) { return key = std::move(name), *this; }
+  Control& Of(const CYbSEKvfBase& owner, std::string name) { return node = &owner, Key(std::move(name)); }
   Control& Folder(std::string path) { return folder = std::move(path), *this; }
   Control& ToolTip(std::string text_) { return toolTip = std::move(text_), *this; }
   Control& Revalidates() { return revalidates = true, *this; }
@@ -132,13 +151,16 @@ class Control {
 /// The controls of a page, a group or a sub-form, in the order in which they stand and are reached by the keyboard.
 class PageForm {
  public:
-  explicit PageForm(CYbSEKvfBase& node);
+  explicit PageForm(CYbSEKvfBase& node) : PageForm(node, std::make_shared<BoundKeys>()) {}
+  /// A part of a page, which shares what the page knows of keys.
+  PageForm(CYbSEKvfBase& node, std::shared_ptr<BoundKeys> keys);
 
   /// A flag of the node, 0 or 1.
   Control& Check(std::string label, int& flag);
   Control& Check(std::string label, bool& flag);
-  Control& Radio(std::string label, int& value, std::vector<std::string> options);
-  Control& Choice(std::string label, int& value, std::vector<std::string> options);
+  /// A choice of those that the key's declaration offers, or of others.
+  Control& Radio(std::string label, int& value, std::vector<std::string> options = {});
+  Control& Choice(std::string label, int& value, std::vector<std::string> options = {});
   /// The same for a value that is not a member.
   Control& Choice(std::string label, std::function<int()> get, std::function<void(int)> set,
                   std::vector<std::string> options);
@@ -179,12 +201,15 @@ class PageForm {
   /// The same for a chart.
   Control& Chart(std::function<SeriesContent()> content);
   /// A frame with a title; the controls are added to the form that it holds.
-  PageForm& Group(std::string title);
+  PageForm& Group(std::string title, Condition shownWhen = {});
   /// The same, in one row with the group before it.
   PageForm& GroupBeside(std::string title);
+  /// A form for `SubForms` over this page's node or another one.
+  std::shared_ptr<PageForm> NewSubForm(CYbSEKvfBase& node) { return std::make_shared<PageForm>(node, keys_); }
   Control& SubForms(std::vector<std::shared_ptr<PageForm>> forms, std::function<int()> current);
 
   CYbSEKvfBase& Node() const { return node_; }
+  BoundKeys& Keys() const { return *keys_; }
   const std::vector<std::unique_ptr<Control>>& Controls() const { return controls_; }
   std::vector<std::unique_ptr<Control>>& Controls() { return controls_; }
 
@@ -207,8 +232,7 @@ class PageForm {
 
   CYbSEKvfBase& node_;
   std::vector<std::unique_ptr<Control>> controls_;
-  std::unordered_map<const void*, std::string>
-      keys_;  ///< Members of the node and the keys under which they are stored.
+  std::shared_ptr<BoundKeys> keys_;
 };
 
 /// A form as text, one line for each control in the order of the page: kind, label in double quotes, value, unit, and

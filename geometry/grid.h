@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "platform/files.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
 
 namespace tervane {
@@ -149,7 +150,7 @@ class CTvn2DOrthoRotatedGridData {
   std::vector<float> values_;
   float deleteValue_ = kUsualDeleteValue;
   int itemUnit_ = 0;
-  int itemType_ = kUndefinedItemType;
+  int itemType_ = quantity::kUndefined;
   std::string itemName_;
 };
 

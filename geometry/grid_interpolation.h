@@ -10,6 +10,7 @@
 #include "geometry/grid.h"
 #include "geometry/xyz_text.h"
 #include "platform/files.h"
+#include "platform/item_types.h"
 #include "platform/progress.h"
 #include "platform/units.h"
 
@@ -33,11 +34,11 @@ struct InterpolationOptions {
 /// A file of points with values.
 struct ScatteredFile {
   std::string path;
-  bool isXyz = false;                 ///< Text of x, y, z, else a shape file of points or lines.
-  std::string attribute;              ///< Of a shape file; empty takes the z of its points.
-  int axisUnit = 1000;                ///< One of item 100187.
-  int itemUnit = 0;                   ///< Of the values, one of the item type's.
-  int itemType = kUndefinedItemType;  ///< Without units: values stay as they are.
+  bool isXyz = false;                   ///< Text of x, y, z, else a shape file of points or lines.
+  std::string attribute;                ///< Of a shape file; empty takes the z of its points.
+  int axisUnit = 1000;                  ///< One of item 100187.
+  int itemUnit = 0;                     ///< Of the values, one of the item type's.
+  int itemType = quantity::kUndefined;  ///< Without units: values stay as they are.
 };
 
 /// Reads the points of a file in metres, their values in the base unit of the item type. Lines give their vertices.

@@ -10,6 +10,7 @@
 
 #include <fmt/format.h>
 
+#include "platform/item_types.h"
 #include "platform/text_fields.h"
 
 namespace tervane {
@@ -224,7 +225,7 @@ FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS_Polygon(GridGeometry g
   try {
     std::vector<float> values(geometry.CellCount(), fill);
     PutPolygons(shapes.GetData(), codes, geometry, deleteValue, values, progress.Part(kReading, 1));
-    result.error = TakeValues(std::move(geometry), std::move(values), deleteValue, kWholeNumberUnit, kCodeItemType);
+    result.error = TakeValues(std::move(geometry), std::move(values), deleteValue, kWholeNumberUnit, quantity::kCode);
   } catch (const std::bad_alloc&) {
     return refused("there is no memory for the grid");
   } catch (const Cancelled&) {
@@ -257,7 +258,7 @@ FileResult CTvn2DOrthoRotatedGridData::MakeCatchmentGriddataFromShapefile(const 
                       grid.xMin, grid.xMax, grid.yMin, grid.yMax, extent.xMin, extent.xMax, extent.yMin, extent.yMax));
     }
     result.error =
-        TakeValues(std::move(geometry), std::move(values), kUsualDeleteValue, kWholeNumberUnit, kCodeItemType);
+        TakeValues(std::move(geometry), std::move(values), kUsualDeleteValue, kWholeNumberUnit, quantity::kCode);
   } catch (const std::bad_alloc&) {
     return refused("there is no memory for the grid");
   } catch (const Cancelled&) {

@@ -8,6 +8,7 @@
 
 #include "geometry/grid_interpolation.h"
 #include "geometry/shapes.h"
+#include "platform/item_types.h"
 
 namespace tervane {
 
@@ -22,7 +23,7 @@ FileResult ReadScatteredFile(const ScatteredFile& file, std::vector<ScatteredPoi
     return refused(fmt::format("the unit {} of its coordinates is no length", file.axisUnit));
   }
   UnitConversion toBase;
-  if (const ItemType* const itemType = FindItemType(file.itemType); itemType && file.itemType != kUndefinedItemType) {
+  if (const ItemType* const itemType = FindItemType(file.itemType); itemType && file.itemType != quantity::kUndefined) {
     if (!AllowsUnit(*itemType, file.itemUnit)) {
       return refused(fmt::format("the unit {} of its values is none of {}", file.itemUnit, itemType->name));
     }

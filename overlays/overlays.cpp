@@ -7,6 +7,7 @@
 #include <fmt/format.h>
 
 #include "overlays/pages.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/units.h"
 
@@ -55,7 +56,10 @@ void COverlayBMPKvf::ExchangeKeys(KeyExchange& keys) {
 
 COverlayGridKvf::COverlayGridKvf(CYbSEKvfBase* parent)
     : OverlayLayer("OverlayGrid", "OverlayGrid", parent), file_(NewChild<CTvnData2DNdsFile>()) {
-  file_->SetFileUsed(0);
+  file_->UsedWhen(Condition::Sentence("the overlay is a grid", [this](const CYbSEKvfBase&) {
+    const auto* item = dynamic_cast<const COverlayItemKvf*>(GetParent());
+    return item && item->Type == COverlayItemKvf::kGrid;
+  }));
   file_->SetDomainCheck(0);
 }
 
@@ -64,15 +68,9 @@ void COverlayGridKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Display", Display);
 }
 
-int COverlayGridKvf::ValidateData() {
-  const auto* item = dynamic_cast<const COverlayItemKvf*>(GetParent());
-  file_->SetFileUsed(item && item->Type == COverlayItemKvf::kGrid);
-  return 1;
-}
-
 COverlayShapeKvf::COverlayShapeKvf(CYbSEKvfBase* parent)
     : OverlayLayer("Shape overlay", "OverlayShape", parent),
-      ShapeAxisUnit(BaseUnit(*FindItemType(kCoordinateItemType)).key) {}
+      ShapeAxisUnit(BaseUnit(*FindItemType(quantity::kMapCoordinate)).key) {}
 
 void COverlayShapeKvf::ExchangeKeys(KeyExchange& keys) {
   FileKey(keys, "Filename", Filename);
@@ -142,10 +140,6 @@ const std::string& COverlayItemKvf::GetAbbreviatedTitle() const {
   return shownTitle_;
 }
 
-COverlayCurrentLayerGridKvf::COverlayCurrentLayerGridKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Grid", "Grid", parent) {
-  if (GetRoot()) GetRoot()->RegisterImportantNode(this, "OVERLAY_CURRENT_LAYER_GRID");
-}
-
 void COverlayCurrentLayerGridKvf::ExchangeKeys(KeyExchange& keys) {
   // Once there were five steps.
   constexpr std::array kSteps{0.19F, 0.25F, 0.38F, 0.5F, 0.62F};
@@ -158,20 +152,17 @@ void COverlayCurrentLayerGridKvf::ExchangeKeys(KeyExchange& keys) {
 
 COverlayCurrentLayerKvf::COverlayCurrentLayerKvf(CYbSEKvfBase* parent)
     : CYbSEKvfGroupBase("Current Layer", "Current_Layer", parent) {
-  NewChild<COverlayCurrentLayerGridKvf>();
+  NewImportantChild<COverlayCurrentLayerGridKvf>(kCurrentLayerGrid);
 }
 
 // ---- All of them
 
 COverlaysKvf::COverlaysKvf(CYbSEKvfBase* parent)
     : CTvnKvfGroupBase("Display", "Overlays", parent),
-      foreground_(NewChild<COverlayListKvf>("Foreground")),
-      background_(NewChild<COverlayListKvf>("Background")) {
+      foreground_(NewImportantChild<COverlayListKvf>(kForegroundOverlays, "Foreground")),
+      background_(NewImportantChild<COverlayListKvf>(kBackgroundOverlays, "Background")) {
   NewChild<COverlayCurrentLayerKvf>();
   SetPage(kDisplayPage);
-  if (!GetRoot()) return;
-  GetRoot()->RegisterImportantNode(foreground_, "FOREGROUND_OVERLAY_DATA");
-  GetRoot()->RegisterImportantNode(background_, "BACKGROUND_OVERLAY_DATA");
 }
 
 void COverlaysKvf::ExchangeState(KeyExchange& keys) {
@@ -180,7 +171,7 @@ void COverlaysKvf::ExchangeState(KeyExchange& keys) {
 }
 
 float COverlaysKvf::CurrentTransparency() const {
-  const auto* grid = Important<COverlayCurrentLayerGridKvf>("OVERLAY_CURRENT_LAYER_GRID");
+  const auto* grid = Important(kCurrentLayerGrid);
   return grid ? grid->TransparencyVal : 0.5F;
 }
 
@@ -199,7 +190,7 @@ void COverlaysKvf::AdoptDomain(const Envelope& domain) {
 
 int COverlaysKvf::ValidateData() {
   auto* root = dynamic_cast<CTvnKvfGlobalBase*>(GetRoot());
-  if (const auto* domain = Important<CCatchmentKvf>("CATCHMENT")) AdoptDomain(domain->GetEnvelope());
+  if (const auto* domain = Important(kDomain)) AdoptDomain(domain->GetEnvelope());
   if (!root) return 1;
   int isUndefined = 0;
   root->IsUndefined(isUndefined);

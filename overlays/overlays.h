@@ -45,7 +45,6 @@ class COverlayGridKvf : public OverlayLayer {
 
   CTvnData2DNdsFile& GridFile() const { return *file_; }
   const FileName& LayerFile() const override { return file_->File; }
-  int ValidateData() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
@@ -141,17 +140,20 @@ class COverlayListKvf : public CYbSEKvfListBase<COverlayItemKvf> {
  public:
   COverlayListKvf(std::string title, CYbSEKvfBase* parent) : CYbSEKvfListBase(title, title, parent) {}
 };
+inline constexpr ImportantName<COverlayListKvf> kBackgroundOverlays{"BACKGROUND_OVERLAY_DATA"};
+inline constexpr ImportantName<COverlayListKvf> kForegroundOverlays{"FOREGROUND_OVERLAY_DATA"};
 
 /// How the data themselves are drawn.
 class COverlayCurrentLayerGridKvf : public CTvnKvfBase {
  public:
-  explicit COverlayCurrentLayerGridKvf(CYbSEKvfBase* parent);
+  explicit COverlayCurrentLayerGridKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Grid", "Grid", parent) {}
 
   float TransparencyVal = 0.5F;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };
+inline constexpr ImportantName<COverlayCurrentLayerGridKvf> kCurrentLayerGrid{"OVERLAY_CURRENT_LAYER_GRID"};
 
 class COverlayCurrentLayerKvf : public CYbSEKvfGroupBase {
  public:
@@ -186,5 +188,6 @@ class COverlaysKvf : public CTvnKvfGroupBase, public DomainFollower {
   COverlayListKvf* foreground_;
   COverlayListKvf* background_;
 };
+inline constexpr ImportantName<COverlaysKvf> kOverlays{kDomainFollower.text};
 
 }  // namespace tervane

@@ -8,6 +8,7 @@
 #include <fmt/format.h>
 
 #include "pages/parts/plot_content.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
 
 namespace tervane {
@@ -112,7 +113,7 @@ MapContent DataFileView::Map() {
   map = FileMap(file, slice_);
   if (map.grids.empty()) return map;
   grid_ = map.grids.front().grid;
-  map.grids.front().isCodes = Item().itemType == kCodeItemType;
+  map.grids.front().isCodes = Item().itemType == quantity::kCode;
   if (Steps() > 1 || Layers() > 1) map.grids.front().range = WholeRange();
   return map;
 }
@@ -121,7 +122,7 @@ std::optional<std::pair<float, float>> DataFileView::WholeRange() const {
   const auto stored = file_.StoredStatistics(chosen_.front());
   if (!stored || !(stored->smallest <= stored->largest)) return std::nullopt;
   UnitConversion toBase;
-  if (const ItemType* type = FindItemType(Item().itemType); type && type->code != kUndefinedItemType) {
+  if (const ItemType* type = FindItemType(Item().itemType); type && type->code != quantity::kUndefined) {
     const auto conversion = Item().scale ? ConversionBetween(*Item().scale, BaseUnit(*type).scale) : std::nullopt;
     if (!conversion) return std::nullopt;
     toBase = *conversion;
@@ -161,7 +162,7 @@ std::size_t DataFileView::ColumnCount() const {
 
 FieldUnit DataFileView::UnitOf(const DataItem& item) const {
   // Grids are read in the base unit of their quantity; series and lines stay as they are.
-  const bool isConverted = item.dimensions >= 2 && item.itemType != kUndefinedItemType && FindItemType(item.itemType);
+  const bool isConverted = item.dimensions >= 2 && item.itemType != quantity::kUndefined && FindItemType(item.itemType);
   return isConverted ? FieldUnit{{}, item.itemType, units_} : FieldUnit{ShortUnitOf(item), 0, nullptr};
 }
 

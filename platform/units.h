@@ -85,9 +85,6 @@ struct ItemType {
   std::span<const int> unitKeys;  ///< In the order of choice lists; never empty.
 };
 
-inline constexpr int kUndefinedItemType = 999;      ///< A value of any meaning, without a unit.
-inline constexpr int kCodeItemType = 100370;        ///< Whole-number codes.
-inline constexpr int kCoordinateItemType = 100187;  ///< X and Y on the map.
 inline constexpr int kDimensionlessUnit = 99000;
 inline constexpr int kWholeNumberUnit = 99013;
 

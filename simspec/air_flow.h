@@ -3,7 +3,7 @@
 #pragma once
 
 #include "core/node.h"
-#include "simspec/model_components.h"
+#include "simspec/conditions.h"
 #include "simspec/pages.h"
 
 namespace tervane {
@@ -14,6 +14,11 @@ class CAirFlowModKvf : public CTvnKvfBase {
   explicit CAirFlowModKvf(CYbSEKvfBase* parent)
       : CTvnKvfBase("Air Flow Simulation Parameters", "AirFlowSimulationParametersMod", parent) {
     SetPage(kAirFlowModPage);
+    TakesPartWhen(
+        WithEngine({kEngineModflowSurfact}) && ModflowComponent(&CModModelCompKvf::Subsurface) &&
+        Condition::Sentence("the subsurface is variably saturated with air flow", [](const CYbSEKvfBase& node) {
+          return ModModelCompOf(node).GetSubsurfaceModelType() == kVariablySaturatedWithAir;
+        }));
   }
 
   float DensityWater = 1000;
@@ -25,12 +30,6 @@ class CAirFlowModKvf : public CTvnKvfBase {
   float StdAtmPressure = 1010;
   float GravityAcceleration = 9.81f;
   int TypeAmbientWaterHeadInput = 0;
-
-  int IsDlgUsedInSetup() override {
-    CModModelCompKvf& components = ModModelCompOf(*this);
-    return EngineOf(*this) == kEngineModflowSurfact && components.Subsurface &&
-           components.GetSubsurfaceModelType() == 3;
-  }
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override {

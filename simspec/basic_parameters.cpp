@@ -14,14 +14,14 @@ namespace tervane {
 
 CBasicParaKvf::CBasicParaKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Simulation specification", "SimSpec", parent) {
   SetPage(kBasicParaPage);
-  CYbSEKvfGlobalBase& root = *GetRoot();
-  root.RegisterImportantNode(this, "BASICPARAMETERS");
-  root.RegisterImportantNode(NewChild<CModelCompKvf>(), "MODELCOMP");
-  root.RegisterImportantNode(NewChild<CModModelCompKvf>(), "MODMODELCOMP");
+  // Its children ask for the engine while they are made.
+  if (GetRoot()) GetRoot()->RegisterImportantNode(this, kBasicParameters.text);
+  NewImportantChild<CModelCompKvf>(kModelComponents);
+  NewImportantChild<CModModelCompKvf>(kModflowComponents);
   NewChild<CSimTitleKvf>();
-  root.RegisterImportantNode(NewChild<CSimPeriodKvf>(), "SIMPERIOD");
+  NewImportantChild<CSimPeriodKvf>(kSimulationPeriod);
   NewChild<CCompControlParaTimeStepKvf>();
-  root.RegisterImportantNode(NewChild<CCompControlParaOLKvf>(), "COMPCONTROLPARAOL");
+  NewImportantChild<CCompControlParaOLKvf>(kOverlandControl);
   NewChild<CCompControlParaUZKvf>();
   NewChild<CCompControlParaSZKvf>();
   NewChild<CAirFlowModKvf>();

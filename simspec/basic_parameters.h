@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/node.h"
+#include "simspec/model_components.h"
 
 namespace tervane {
 
@@ -19,7 +20,8 @@ class CBasicParaKvf : public CTvnKvfBase {
   int AddToOverview(std::vector<OverviewLine>& /*lines*/, int /*level*/) override { return 1; }
 
  protected:
-  void ExchangeKeys(KeyExchange& keys) override { keys("ModelType", ModelType); }
+  void ExchangeKeys(KeyExchange& keys) override { keys("ModelType", ModelType).OneOf(kEngines); }
 };
+inline constexpr ImportantName<CBasicParaKvf> kBasicParameters{"BASICPARAMETERS"};
 
 }  // namespace tervane

@@ -13,48 +13,44 @@ namespace tervane {
 /// Overland flow.
 class CCompControlParaOLKvf : public CTvnKvfBase {
  public:
-  explicit CCompControlParaOLKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("OL Computational Control Parameters", "CompControlParaOL", parent) {
-    SetPage(kControlOLPage);
-  }
+  explicit CCompControlParaOLKvf(CYbSEKvfBase* parent);
 
-  int SolverOption = 0;  ///< 0 successive overrelaxation, 1 explicit.
+  enum Solver : int { kSuccessiveOverrelaxation = 0, kExplicit = 1 };
+  enum RiverExchange : int { kManning = 0, kWeir = 1 };
+
+  int SolverOption = kSuccessiveOverrelaxation;
   int MaxNoOfIter = 200;
-  float MaxHeadChange = 0.0001f;     ///< m
-  float MaxResidualError = 0.0001f;  ///< m/d
+  float MaxHeadChange = 0.0001f;
+  float MaxResidualError = 0.0001f;
   float RelaxFactor = 0.9f;
   float MaxCourant_Explicit = 0.8f;
-  float WaterDepthThreshold = 0.0001f;  ///< m
+  float WaterDepthThreshold = 0.0001f;
   float OLFlowReductionGradientThreshold = 0.0001f;
-  int OLRiverExchangeOption = 0;                 ///< 0 Manning equation, 1 weir formula.
-  float WeirFlowReductionDepthThreshold = 0.1f;  ///< m
+  int OLRiverExchangeOption = kManning;
+  float WeirFlowReductionDepthThreshold = 0.1f;
   int Multicell = 0;
   float MulticellFactor = 2;
-
-  int IsDlgUsedInSetup() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };
+inline constexpr ImportantName<CCompControlParaOLKvf> kOverlandControl{"COMPCONTROLPARAOL"};
 
 /// Unsaturated zone.
 class CCompControlParaUZKvf : public CTvnKvfBase {
  public:
-  explicit CCompControlParaUZKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("UZ Computational Control Parameters", "CompControlParaUZ", parent) {
-    SetPage(kControlUZPage);
-  }
+  explicit CCompControlParaUZKvf(CYbSEKvfBase* parent);
 
   float MaxWaterBalanceError = 0.03f;  ///< Fraction, in one node.
   int MaxNoOfIter = 50;
   float IterStopCriteria = 0.002f;  ///< Fraction of the pressure head.
   float CouplingCriteria = 0.001f;  ///< Water balance error of a profile.
 
-  int IsDlgUsedInSetup() override;
-
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };
+
+class CCompControlParaSZPCGBase;
 
 /// Saturated zone: the choice of solver. The parameters of each solver are children, and all are written.
 class CCompControlParaSZKvf : public CTvnKvfBase {
@@ -65,61 +61,53 @@ class CCompControlParaSZKvf : public CTvnKvfBase {
   enum Solver : int { kTransient = 0, kSteadyState = 1, kSuccessiveOverrelaxation = 2 };
   int SolverOption = kTransient;
 
-  int IsDlgUsedInSetup() override;
+  CCompControlParaSZPCGBase& Transient() const { return *transient_; }
+  CCompControlParaSZPCGBase& SteadyState() const { return *steady_; }
 
  protected:
-  void ExchangeKeys(KeyExchange& keys) override { keys("SolverOption", SolverOption); }
+  void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  CCompControlParaSZPCGBase* transient_;
+  CCompControlParaSZPCGBase* steady_;
 };
 
 /// Parameters of one solver of the saturated zone, which takes part when its parent has chosen that solver.
-class CCompControlParaSZSolverBase : public CTvnKvfBase {
- public:
-  CCompControlParaSZSolverBase(std::string title, std::string section, int solver, CYbSEKvfBase* parent)
-      : CTvnKvfBase(std::move(title), std::move(section), parent), solver_(solver) {}
-
-  int IsDlgUsedInSetup() override;
-
- private:
-  int solver_;
+struct SaturatedSolverKind {
+  std::string_view className;
+  std::string title, section;
+  int solver;
 };
 
-/// Preconditioned conjugate gradient.
-class CCompControlParaSZPCGBase : public CCompControlParaSZSolverBase {
+/// Preconditioned conjugate gradient, in transient and in steady state.
+class CCompControlParaSZPCGBase : public CTvnKvfBase {
  public:
-  using CCompControlParaSZSolverBase::CCompControlParaSZSolverBase;
+  CCompControlParaSZPCGBase(const SaturatedSolverKind& kind, CYbSEKvfBase* parent);
+
+  enum UnderRelaxationKind : int { kNone = 0, kDynamicFactor = 1, kConstantFactor = 2 };
 
   int MaxNoOfIter = 0;
   int GradualDrainActivation = 1;
-  float MaxHeadChange = 0;  ///< m
+  float MaxHeadChange = 0;
   int HorizontalConductanceAveraging = 1;
-  float MaxResidualError = 0;           ///< m/d
-  float SatThicknessThreshold = 0.05f;  ///< m
+  float MaxResidualError = 0;
+  float SatThicknessThreshold = 0.05f;
   float UnderRelaxFactor = 0;
-  int UnderRelaxation = 0;  ///< 0 none, 1 with dynamic, 2 with constant factor.
+  int UnderRelaxation = kNone;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };
 
-class CCompControlParaSZPCGTransKvf : public CCompControlParaSZPCGBase {
- public:
-  explicit CCompControlParaSZPCGTransKvf(CYbSEKvfBase* parent);
-};
-
-class CCompControlParaSZPCGSteadyKvf : public CCompControlParaSZPCGBase {
- public:
-  explicit CCompControlParaSZPCGSteadyKvf(CYbSEKvfBase* parent);
-};
-
 /// Successive overrelaxation.
-class CCompControlParaSZSORKvf : public CCompControlParaSZSolverBase {
+class CCompControlParaSZSORKvf : public CTvnKvfBase {
  public:
   explicit CCompControlParaSZSORKvf(CYbSEKvfBase* parent);
 
   int MaxNoOfIter = 200;
-  float MaxHeadChange = 0.001f;         ///< m
-  float MaxResidualError = 0.0001f;     ///< m/d
-  float SatThicknessThreshold = 0.05f;  ///< m
+  float MaxHeadChange = 0.001f;
+  float MaxResidualError = 0.0001f;
+  float SatThicknessThreshold = 0.05f;
   float OverRelaxFactor = 1.3f;
 
  protected:
@@ -129,13 +117,9 @@ class CCompControlParaSZSORKvf : public CCompControlParaSZSolverBase {
 /// Exchange between river and aquifer in transient simulations.
 class CCompControlParaRivExKvf : public CTvnKvfBase {
  public:
-  explicit CCompControlParaRivExKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("River-Aquifer Exchange Computational Control Parameters (transient simulations)",
-                    "CompControlParaRivEx", parent) {}
+  explicit CCompControlParaRivExKvf(CYbSEKvfBase* parent);
 
   float MaxFractionHPointVolume = 0.9f;
-
-  int IsDlgUsedInSetup() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys("MaxFractionHPointVolume", MaxFractionHPointVolume); }
@@ -144,21 +128,19 @@ class CCompControlParaRivExKvf : public CTvnKvfBase {
 /// Transport on colloids in a water quality simulation.
 class CCompControlParaColloidWQKvf : public CTvnKvfBase {
  public:
-  explicit CCompControlParaColloidWQKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("Colloid Control Parameters", "ColloidControlPara", parent) {
-    SetPage(kColloidWQPage);
-  }
+  explicit CCompControlParaColloidWQKvf(CYbSEKvfBase* parent);
 
-  double ConversionFactor = 0.7;       ///< g metabolite / g pesticide
-  double MaxPrecDepthPerTimeStep = 1;  ///< mm
-  double PrecThresholdRate = 0.1;      ///< mm/hour
+  enum Detachment : int { kKineticEnergy = 0, kRainfallMomentum = 1, kMacro = 2 };
+  enum Erosion : int { kParks = 0, kRose = 1, kEurosem = 2 };
+
+  double ConversionFactor = 0.7;
+  double MaxPrecDepthPerTimeStep = 1;
+  double PrecThresholdRate = 0.1;
   double FractionTransportedParticle = 1;
-  double WaterDepthCorr = 1;  ///< 1/mm
-  int DetachmentModel = 2;    ///< 0 kinetic energy, 1 rainfall momentum, 2 MACRO.
-  int ErosionModel = 2;       ///< 0 Parks, 1 Rose, 2 Eurosem.
+  double WaterDepthCorr = 1;
+  int DetachmentModel = kMacro;
+  int ErosionModel = kEurosem;
   int IncludeSorption = 0;
-
-  int IsDlgUsedInSetup() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;

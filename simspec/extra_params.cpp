@@ -47,7 +47,7 @@ void CExtraParamsItemKvf::ExchangeState(KeyExchange& keys) {
 }
 
 int CExtraParamsKvf::GetSectionUsed() const {
-  const auto* basics = Important<CBasicParaKvf>("BASICPARAMETERS");
+  const auto* basics = Important(kBasicParameters);
   return basics ? basics->UsesExtraParams : 1;
 }
 

@@ -8,6 +8,7 @@
 #include <fmt/format.h>
 
 #include "simspec/basic_parameters.h"
+#include "simspec/conditions.h"
 #include "simspec/control_parameters.h"
 #include "simspec/pages.h"
 #include "simspec/periods.h"
@@ -17,19 +18,19 @@
 namespace tervane {
 
 int EngineOf(const CYbSEKvfBase& node) {
-  const auto* basics = node.Important<CBasicParaKvf>("BASICPARAMETERS");
+  const auto* basics = node.Important(kBasicParameters);
   return basics ? basics->ModelType : kEngineTervane;
 }
 
 const CModelCompKvf& ModelCompOf(const CYbSEKvfBase& node) {
   static const CModelCompKvf ofNewSetup(nullptr);
-  const auto* components = node.Important<CModelCompKvf>("MODELCOMP");
+  const auto* components = node.Important(kModelComponents);
   return components ? *components : ofNewSetup;
 }
 
 CModModelCompKvf& ModModelCompOf(const CYbSEKvfBase& node) {
   static CModModelCompKvf ofNewSetup(nullptr);
-  auto* components = node.Important<CModModelCompKvf>("MODMODELCOMP");
+  auto* components = node.Important(kModflowComponents);
   return components ? *components : ofNewSetup;
 }
 
@@ -40,7 +41,9 @@ bool UsesModflow(const CYbSEKvfBase& node) {
 
 // ---- CModelCompKvf
 
-int CModelCompKvf::IsDlgUsedInSetup() { return EngineOf(*this) == kEngineTervane; }
+CModelCompKvf::CModelCompKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Simulation specification", "ModelComp", parent) {
+  TakesPartWhen(OwnEngine());
+}
 
 void CModelCompKvf::ExchangeKeys(KeyExchange& keys) {
   keys("ET", ET);
@@ -50,10 +53,10 @@ void CModelCompKvf::ExchangeKeys(KeyExchange& keys) {
   keys("WM", WM);
   keys("River", River);
   keys("WQ", WQ);
-  keys("ADPTRadio", ADPTRadio);
-  keys("UZ_ModelType", UZ_ModelType);
-  keys("SZ_ModelType", SZ_ModelType);
-  keys("OL_ModelType", OL_ModelType);
+  keys("ADPTRadio", ADPTRadio).OneOf(kWaterQualityMethods);
+  keys("UZ_ModelType", UZ_ModelType).OneOf(kUnsaturatedMethods);
+  keys("SZ_ModelType", SZ_ModelType).OneOf(kSaturatedMethods);
+  keys("OL_ModelType", OL_ModelType).OneOf(kOverlandMethods);
   keys("UseCurrentWmSimulation", UseCurrentWmSimulation);
   keys("FilenameTvdRes", FilenameTvdRes);
 }
@@ -75,7 +78,9 @@ int CModelCompKvf::AddToOverview(std::vector<OverviewLine>& lines, int level) {
 
 // ---- CModModelCompKvf
 
-int CModModelCompKvf::IsDlgUsedInSetup() { return EngineOf(*this) == kEngineModflowSurfact; }
+CModModelCompKvf::CModModelCompKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Model Components", "ModModelComp", parent) {
+  TakesPartWhen(WithEngine({kEngineModflowSurfact}));
+}
 
 int CModModelCompKvf::GetSubsurfaceModelType() {
   VariablySaturated = subsurfaceModelType_ > 1;
@@ -108,13 +113,15 @@ void CModModelCompKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Recharge", Recharge);
   // The held value stays for a return to the engine that knows it.
   keys.Custom(
-      "Recharge_ModelType", [&] { return knowsRechargeType ? Recharge_ModelType : 0; },
-      [&](int type) { Recharge_ModelType = type; });
+          "Recharge_ModelType", [&] { return knowsRechargeType ? Recharge_ModelType : 0; },
+          [&](int type) { Recharge_ModelType = type; })
+      .OneOf(kRechargeMethods)
+      .HeldIn(&Recharge_ModelType);
   keys("Subsurface", Subsurface);
   int subsurfaceModelType = keys.IsReading() ? 1 : GetSubsurfaceModelType();  // An absent key reads as 1.
-  keys("Subsurface_ModelType", subsurfaceModelType);
+  keys("Subsurface_ModelType", subsurfaceModelType).OneOf(kSubsurfaceMethods).HeldIn(&subsurfaceModelType_);
   if (keys.IsReading()) TakeSubsurfaceModelType(subsurfaceModelType);
-  keys("Modflow2000_BCFType", Modflow2000_BCFType);
+  keys("Modflow2000_BCFType", Modflow2000_BCFType).OneOf(kModflow2000FlowPackages);
   keys("ET", ET);
 }
 
@@ -132,11 +139,22 @@ void CModModelCompKvf::ExchangeState(KeyExchange& keys) {
 namespace {
 
 /// Both kinds of water quality simulation need the own engine and a compartment with water in it.
-bool HasWaterQuality(const CYbSEKvfBase& node, int adPtRadio) {
-  const CModelCompKvf& components = ModelCompOf(node);
-  return EngineOf(node) == kEngineTervane && components.WQ && components.ADPTRadio == adPtRadio &&
-         (components.OL || components.UZ || components.SZ);
+Condition HasWaterQuality(int method) {
+  return OwnEngine() && Component(&CModelCompKvf::WQ) && Method(&CModelCompKvf::ADPTRadio, method) &&
+         (Component(&CModelCompKvf::OL) || Component(&CModelCompKvf::UZ) || Component(&CModelCompKvf::SZ));
 }
+
+constexpr KeyChoice kParticleDensities[] = {
+    {CModelCompPTKvf::kByConcentration, "Define initial particle density using initial concentration"},
+    {CModelCompPTKvf::kByNumber, "Define initial particle density as number of particles"}};
+constexpr KeyChoice kParticleLocations[] = {
+    {CModelCompPTKvf::kRandom, "Distribute particles randomly in the cell"},
+    {CModelCompPTKvf::kOnPlane, "Distribute particles evenly on a plane above the bottom of the cell"},
+    {CModelCompPTKvf::kUniform, "Place particles uniformly in the cell"}};
+constexpr KeyChoice kRegistrationZones[] = {
+    {CModelCompPTKvf::kNoZones, "No registration zones"},
+    {CModelCompPTKvf::kByLayers, "Define registration zones by layers"},
+    {CModelCompPTKvf::kByLenses, "Define registration zones by lenses (slower)"}};
 
 }  // namespace
 
@@ -144,17 +162,16 @@ CModelCompWQKvf::CModelCompWQKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Water Quality Simulation Specification", "ModelCompWQ", parent) {
   SetAbbreviatedTitle("WQ Simulation Specification");
   SetPage(kModelCompWQPage);
+  TakesPartWhen(HasWaterQuality(kAdvectionDispersion));
   NewChild<CSimTitleWQKvf>();
   NewChild<CSimPeriodWQKvf>();
   NewChild<CCompControlParaTimeStepWQKvf>();
   NewChild<CCompControlParaColloidWQKvf>();
 }
 
-int CModelCompWQKvf::IsDlgUsedInSetup() { return HasWaterQuality(*this, 0); }
-
 int CModelCompWQKvf::ValidateData() {
   const CModelCompKvf& components = ModelCompOf(*this);
-  if (components.UZ && components.UZ_ModelType == 2 && UZ)
+  if (components.UZ && components.UZ_ModelType == kTwoLayer && UZ)
     AddError("UZ Water Quality is only allowed for the Richards Equation and Gravity flow methods.", "UZ");
   return 1;
 }
@@ -166,7 +183,7 @@ void CModelCompWQKvf::ExchangeKeys(KeyExchange& keys) {
   keys("PlantUptake", PlantUptake);
   keys("SZ", SZ);
   keys("IncludeProcesses", IncludeProcesses);
-  keys("ProcessType", ProcessType);
+  keys("ProcessType", ProcessType).OneOf(kProcessKinds);
 }
 
 // ---- CModelCompPTKvf
@@ -175,21 +192,20 @@ CModelCompPTKvf::CModelCompPTKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Particle Tracking Specification", "ModelCompPT", parent) {
   SetAbbreviatedTitle("PT Simulation Specification");
   SetPage(kModelCompPTPage);
+  TakesPartWhen(HasWaterQuality(kParticleTracking));
   NewChild<CSimTitlePTKvf>();
-  NewChild<CSimPeriodPTKvf>();
+  NewImportantChild<CSimPeriodPTKvf>(kParticleTrackingPeriod);
   NewChild<CCompControlParaPTKvf>();
 }
 
-int CModelCompPTKvf::IsDlgUsedInSetup() { return HasWaterQuality(*this, 1); }
-
 void CModelCompPTKvf::ExchangeKeys(KeyExchange& keys) {
-  keys("InitDensityRadio", InitDensityRadio);
+  keys("InitDensityRadio", InitDensityRadio).OneOf(kParticleDensities);
   keys("ParticleMass", ParticleMass);
-  keys("InitLocationRadio", InitLocationRadio);
-  keys("DistanceFracFromBottom", DistanceFracFromBottom);
+  keys("InitLocationRadio", InitLocationRadio).OneOf(kParticleLocations);
+  keys("DistanceFracFromBottom", DistanceFracFromBottom).Range(0, 1);
   keys("AvoidInitParticlesInFixedCells", AvoidInitParticlesInFixedCells);
   keys("AvoidInitParticlesAboveWaterTable", AvoidInitParticlesAboveWaterTable);
-  keys("RegistrationZoneRadio", RegistrationZoneRadio);
+  keys("RegistrationZoneRadio", RegistrationZoneRadio).OneOf(kRegistrationZones);
   keys("AutomaticWellRegistration", AutomaticWellRegistration);
 }
 

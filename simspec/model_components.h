@@ -16,11 +16,58 @@ enum Engine : int {
   kEngineModflow96 = 2,
   kEngineModflow2000 = 3,
 };
+inline constexpr KeyChoice kEngines[] = {{kEngineTervane, "Tervane"},
+                                         {kEngineModflowSurfact, "MODFLOW Surfact"},
+                                         {kEngineModflow96, "MODFLOW 96"},
+                                         {kEngineModflow2000, "MODFLOW 2000"}};
+
+/// How the own engine models overland flow.
+enum OverlandMethod : int { kFiniteDifferenceOverland = 0, kSubcatchmentOverland = 1 };
+inline constexpr KeyChoice kOverlandMethods[] = {{kFiniteDifferenceOverland, "Finite Difference"},
+                                                 {kSubcatchmentOverland, "Subcatchment based"}};
+/// The same of the unsaturated zone.
+enum UnsaturatedMethod : int { kRichardsEquation = 0, kGravityFlow = 1, kTwoLayer = 2 };
+inline constexpr KeyChoice kUnsaturatedMethods[] = {
+    {kRichardsEquation, "Richards equation"}, {kGravityFlow, "Gravity Flow"}, {kTwoLayer, "2 Layer UZ"}};
+/// The same of the saturated zone.
+enum SaturatedMethod : int { kFiniteDifferenceSaturated = 0, kLinearReservoir = 1 };
+inline constexpr KeyChoice kSaturatedMethods[] = {{kFiniteDifferenceSaturated, "Finite Difference"},
+                                                  {kLinearReservoir, "Linear Reservoir"}};
+
+/// How recharge is modelled with Modflow; only Surfact knows the latter.
+enum RechargeMethod : int { kModflowRecharge = 0, kRechargeSeepageFace = 1 };
+inline constexpr KeyChoice kRechargeMethods[] = {{kModflowRecharge, "MODFLOW Recharge"},
+                                                 {kRechargeSeepageFace, "Recharge-Seepage Face"}};
+/// `Subsurface_ModelType` with Modflow.
+enum SubsurfaceMethod : int {
+  kWithoutRewetting = 0,
+  kWithRewetting = 1,
+  kVariablySaturated = 2,
+  kVariablySaturatedWithAir = 3,
+};
+inline constexpr KeyChoice kSubsurfaceMethods[] = {
+    {kWithoutRewetting, "Block Centered Flow (BCF)"},
+    {kWithRewetting, "Block Centered Flow (BCF) with cell rewetting"},
+    {kVariablySaturated, "Variably Saturated Flow"},
+    {kVariablySaturatedWithAir, "Variably Saturated Flow with air flow"}};
+inline constexpr KeyChoice kModflow2000FlowPackages[] = {{0, "Block Centered Flow (BCF)"},
+                                                         {1, "Layer Property Flow (LPF)"}};
+
+/// How water quality is modelled.
+enum WaterQualityMethod : int { kAdvectionDispersion = 0, kParticleTracking = 1 };
+inline constexpr KeyChoice kWaterQualityMethods[] = {
+    {kAdvectionDispersion, "Calculate WQ using the finite difference, Advection-Dispersion (AD) method"},
+    {kParticleTracking, "Calculate WQ using random walk particle tracking (SZ only)"}};
+/// Which processes change species.
+enum ProcessKind : int { kSorptionAndDecay = 0, kKinetra = 1, kColloids = 2 };
+inline constexpr KeyChoice kProcessKinds[] = {{kSorptionAndDecay, "Sorption and Decay"},
+                                              {kKinetra, "Kinetra"},
+                                              {kColloids, "Sorption and Decay with colloids", false}};
 
 /// The components with the own engine. Flags are 0 or 1.
 class CModelCompKvf : public CTvnKvfBase {
  public:
-  explicit CModelCompKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Simulation specification", "ModelComp", parent) {}
+  explicit CModelCompKvf(CYbSEKvfBase* parent);
 
   int ET = 1;
   int OL = 1;
@@ -29,32 +76,32 @@ class CModelCompKvf : public CTvnKvfBase {
   int WM = 1;  ///< Water movement as a whole.
   int River = 0;
   int WQ = 0;
-  int ADPTRadio = 0;     ///< 0 advection-dispersion, 1 random walk particle tracking.
-  int UZ_ModelType = 2;  ///< 0 Richards equation, 1 gravity flow, 2 two-layer.
-  int SZ_ModelType = 0;  ///< 0 finite difference, 1 linear reservoir.
-  int OL_ModelType = 0;  ///< 0 finite difference, 1 subcatchment based.
+  int ADPTRadio = kAdvectionDispersion;
+  int UZ_ModelType = kTwoLayer;
+  int SZ_ModelType = kFiniteDifferenceSaturated;
+  int OL_ModelType = kFiniteDifferenceOverland;
   int UseCurrentWmSimulation = 1;
   FileName FilenameTvdRes;  ///< Catalogue of the simulation whose flow the water quality uses.
 
-  int IsDlgUsedInSetup() override;
   int AddToOverview(std::vector<OverviewLine>& lines, int level) override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };
+inline constexpr ImportantName<CModelCompKvf> kModelComponents{"MODELCOMP"};
 
 /// The components with a Modflow engine.
 class CModModelCompKvf : public CTvnKvfBase {
  public:
-  explicit CModModelCompKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Model Components", "ModModelComp", parent) {}
+  explicit CModModelCompKvf(CYbSEKvfBase* parent);
 
   int OL = 0;
   int River = 0;
   int RiverModelType = 0;
   int Recharge = 0;
-  int Recharge_ModelType = 0;  ///< 0 Modflow recharge, 1 recharge-seepage face; only Surfact knows the latter.
+  int Recharge_ModelType = kModflowRecharge;
   int Subsurface = 1;
-  int Modflow2000_BCFType = 1;  ///< 0 block centered flow, 1 layer property flow.
+  int Modflow2000_BCFType = 1;  ///< One of `kModflow2000FlowPackages`.
   int ET = 0;
 
   // Held in the file only through `Subsurface_ModelType`.
@@ -68,8 +115,6 @@ class CModModelCompKvf : public CTvnKvfBase {
   /// Takes the choice between block centered (0) and variably saturated flow (1) with the engine that knows both.
   void ChooseVariablySaturated(int choice);
 
-  int IsDlgUsedInSetup() override;
-
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
   void ExchangeState(KeyExchange& keys) override;
@@ -79,6 +124,7 @@ class CModModelCompKvf : public CTvnKvfBase {
 
   int subsurfaceModelType_ = 1;
 };
+inline constexpr ImportantName<CModModelCompKvf> kModflowComponents{"MODMODELCOMP"};
 
 /// What takes part in a water quality simulation.
 class CModelCompWQKvf : public CTvnKvfBase {
@@ -91,34 +137,37 @@ class CModelCompWQKvf : public CTvnKvfBase {
   int PlantUptake = 0;
   int SZ = 0;
   int IncludeProcesses = 0;
-  int ProcessType = 0;  ///< 0 sorption and decay, 1 Kinetra, 2 sorption and decay with colloids.
+  int ProcessType = kSorptionAndDecay;
 
-  int IsDlgUsedInSetup() override;
   int ValidateData() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };
+inline constexpr ImportantName<CModelCompWQKvf> kWaterQualityComponents{"MODEL_COMP_WQ"};
 
 /// How particles are placed and registered in a particle tracking simulation.
 class CModelCompPTKvf : public CTvnKvfBase {
  public:
   explicit CModelCompPTKvf(CYbSEKvfBase* parent);
 
-  int InitDensityRadio = 1;   ///< 0 by initial concentration, 1 by number of particles.
+  enum Density : int { kByConcentration = 0, kByNumber = 1 };
+  enum Location : int { kRandom = 0, kOnPlane = 1, kUniform = 2 };
+  enum RegistrationZones : int { kNoZones = 0, kByLayers = 1, kByLenses = 2 };
+
+  int InitDensityRadio = kByNumber;
   double ParticleMass = 100;  ///< Quantity 100452.
-  int InitLocationRadio = 0;  ///< 0 randomly, 1 on a plane above the cell's bottom, 2 uniformly.
+  int InitLocationRadio = kRandom;
   double DistanceFracFromBottom = 0.5;
   int AvoidInitParticlesInFixedCells = 0;
   int AvoidInitParticlesAboveWaterTable = 1;
-  int RegistrationZoneRadio = 0;  ///< 0 none, 1 by layers, 2 by lenses.
+  int RegistrationZoneRadio = kNoZones;
   int AutomaticWellRegistration = 1;
-
-  int IsDlgUsedInSetup() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };
+inline constexpr ImportantName<CModelCompPTKvf> kParticleTrackingComponents{"MODEL_COMP_PT"};
 
 // ---- What other nodes ask
 

@@ -96,11 +96,19 @@ int CSimPeriodKvf::LoadHotStartDates(const std::string& path) {
 
 // ---- Periods on flow results
 
+namespace {
+
+constexpr KeyChoice kRecyclings[] = {{CSimPeriodOnFlowBase::kNoRecycling, "No recycling on flow results"},
+                                     {CSimPeriodOnFlowBase::kRecycling, "Recycling on flow results"},
+                                     {CSimPeriodOnFlowBase::kConstantFlowField, "Constant Water Movement Flow Field"}};
+
+}  // namespace
+
 CSimPeriodOnFlowBase::CSimPeriodOnFlowBase(std::string title, std::string abbreviatedTitle, std::string section,
                                            CYbSEKvfBase* parent)
     : CTvnKvfBase(std::move(title), std::move(section), parent) {
   SetAbbreviatedTitle(std::move(abbreviatedTitle));
-  if (const auto* period = Important<CSimPeriodKvf>("SIMPERIOD")) {
+  if (const auto* period = Important(kSimulationPeriod)) {
     SimStart = CycleRestartDate = period->GetSimStartDate();
     SimEnd = CycleEndDate = FlowFieldSolutionDate = period->SIMEND;
   }
@@ -109,7 +117,7 @@ CSimPeriodOnFlowBase::CSimPeriodOnFlowBase(std::string title, std::string abbrev
 void CSimPeriodOnFlowBase::ExchangeKeys(KeyExchange& keys) {
   keys("SimStart", SimStart);
   keys("SimEnd", SimEnd);
-  keys("RecyclingType", RecyclingType);
+  keys("RecyclingType", RecyclingType).OneOf(kRecyclings);
   keys("CycleRestartDate", CycleRestartDate);
   keys("CycleEndDate", CycleEndDate);
   keys("FlowFieldSolutionDate", FlowFieldSolutionDate);
@@ -117,7 +125,7 @@ void CSimPeriodOnFlowBase::ExchangeKeys(KeyExchange& keys) {
 
 int CSimPeriodOnFlowBase::ValidateData() {
   CYbDateTime start, end;
-  if (const auto* period = Important<CSimPeriodKvf>("SIMPERIOD")) {
+  if (const auto* period = Important(kSimulationPeriod)) {
     start = period->GetSimStartDate();
     end = period->SIMEND;
   }

@@ -41,6 +41,7 @@ class CSimPeriodKvf : public CTvnKvfBase {
   void ExchangeKeys(KeyExchange& keys) override;
   void ExchangeState(KeyExchange& keys) override;
 };
+inline constexpr ImportantName<CSimPeriodKvf> kSimulationPeriod{"SIMPERIOD"};
 
 /// The dates of a simulation that runs on flow results: water quality or particle tracking.
 class CSimPeriodOnFlowBase : public CTvnKvfBase {
@@ -50,7 +51,8 @@ class CSimPeriodOnFlowBase : public CTvnKvfBase {
 
   CYbDateTime SimStart;
   CYbDateTime SimEnd;
-  int RecyclingType = 0;  ///< 0 none, 1 recycling on flow results, 2 constant flow field.
+  enum Recycling : int { kNoRecycling = 0, kRecycling = 1, kConstantFlowField = 2 };
+  int RecyclingType = kNoRecycling;
   CYbDateTime CycleRestartDate;
   CYbDateTime CycleEndDate;
   CYbDateTime FlowFieldSolutionDate;
@@ -75,8 +77,8 @@ class CSimPeriodPTKvf : public CSimPeriodOnFlowBase {
       : CSimPeriodOnFlowBase("Particle Tracking Simulation Period", "PT Simulation Period", "SimulationPeriodPT",
                              parent) {
     SetPage(kSimPeriodPTPage);
-    if (GetRoot()) GetRoot()->RegisterImportantNode(this, "PT_SIM_PERIOD");
   }
 };
+inline constexpr ImportantName<CSimPeriodPTKvf> kParticleTrackingPeriod{"PT_SIM_PERIOD"};
 
 }  // namespace tervane

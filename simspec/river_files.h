@@ -13,5 +13,6 @@ class RiverFiles {
   /// The river simulation file.
   virtual const FileName& GetFilename() const = 0;
 };
+inline constexpr ImportantName<RiverFiles> kRiver{"River"};
 
 }  // namespace tervane

@@ -2,27 +2,31 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "simspec/time_step_control.h"
 
-#include "simspec/model_components.h"
+#include "simspec/conditions.h"
 #include "simspec/pages.h"
 
 namespace tervane {
 
-int CCompControlParaTimeStepKvf::IsDlgUsedInSetup() { return EngineOf(*this) == kEngineTervane; }
+CCompControlParaTimeStepKvf::CCompControlParaTimeStepKvf(CYbSEKvfBase* parent)
+    : CTvnKvfBase("Time step control", "CompControlParaTimeStep", parent) {
+  SetPage(kTimeStepPage);
+  TakesPartWhen(OwnEngine());
+}
 
 void CCompControlParaTimeStepKvf::ExchangeKeys(KeyExchange& keys) {
-  keys("InitialTimeStep", InitialTimeStep);
-  keys.Since(10)("MaxAllowedOLTimeStep", MaxAllowedOLTimeStep);
-  keys.Since(10)("MaxAllowedUZTimeStep", MaxAllowedUZTimeStep);
+  keys("InitialTimeStep", InitialTimeStep).Unit("hours");
+  keys.Since(10)("MaxAllowedOLTimeStep", MaxAllowedOLTimeStep).Unit("hours");
+  keys.Since(10)("MaxAllowedUZTimeStep", MaxAllowedUZTimeStep).Unit("hours");
   // One limit served both until version 9.
   float both = 0;
   if (keys.Until(9, "MaxAllowedTimeStep", both)) MaxAllowedOLTimeStep = MaxAllowedUZTimeStep = both;
-  keys("MaxAllowedSZTimeStep", MaxAllowedSZTimeStep);
-  keys("IncrementRate", IncrementRate);
-  keys("MaxPrecDepthPerTimeStep", MaxPrecDepthPerTimeStep);
+  keys("MaxAllowedSZTimeStep", MaxAllowedSZTimeStep).Unit("hours");
+  keys("IncrementRate", IncrementRate).Range(0, 1);
+  keys("MaxPrecDepthPerTimeStep", MaxPrecDepthPerTimeStep).Unit("mm");
   // The engine knows this key with a blank behind its name.
-  keys.Since(7)("MaxInfiltDepthPerTimeStep ", MaxInfiltDepthPerTimeStep);
+  keys.Since(7)("MaxInfiltDepthPerTimeStep ", MaxInfiltDepthPerTimeStep).Unit("mm");
   if (keys.IsReading() && keys.DocVersion() < 7) MaxInfiltDepthPerTimeStep = MaxPrecDepthPerTimeStep;
-  keys("PrecThresholdRate", PrecThresholdRate);
+  keys("PrecThresholdRate", PrecThresholdRate).Unit("mm/hr");
 }
 
 CCompControlParaTimeStepWQKvf::CCompControlParaTimeStepWQKvf(CYbSEKvfBase* parent)
@@ -32,12 +36,12 @@ CCompControlParaTimeStepWQKvf::CCompControlParaTimeStepWQKvf(CYbSEKvfBase* paren
 }
 
 void CCompControlParaTimeStepWQKvf::ExchangeKeys(KeyExchange& keys) {
-  const auto exchange = [&](const std::string& key, double Limits::*limit) {
-    keys(key + "SZ", SZ.*limit);
-    keys(key + "UZ", UZ.*limit);
-    keys(key + "OL", OL.*limit);
+  const auto exchange = [&](const std::string& key, double Limits::*limit, std::string_view unit = {}) {
+    keys(key + "SZ", SZ.*limit).Unit(unit);
+    keys(key + "UZ", UZ.*limit).Unit(unit);
+    keys(key + "OL", OL.*limit).Unit(unit);
   };
-  exchange("MaxSimTimeStep", &Limits::MaxSimTimeStep);
+  exchange("MaxSimTimeStep", &Limits::MaxSimTimeStep, "hours");
   exchange("MaxAdvectiveCourant", &Limits::MaxAdvectiveCourant);
   exchange("MaxDispersiveCourant", &Limits::MaxDispersiveCourant);
   exchange("MaxTransLimit", &Limits::MaxTransLimit);
@@ -53,7 +57,7 @@ CCompControlParaPTKvf::CCompControlParaPTKvf(CYbSEKvfBase* parent)
 void CCompControlParaPTKvf::ExchangeKeys(KeyExchange& keys) {
   keys("ApplyVerticalCorrection", ApplyVerticalCorrection);
   keys("IgnoreVerticalCourant", IgnoreVerticalCourant);
-  keys("MaxSimTimeStepSZ", MaxSimTimeStepSZ);
+  keys("MaxSimTimeStepSZ", MaxSimTimeStepSZ).Unit("hours");
   keys("MaxAdvectiveCourantSZ", MaxAdvectiveCourantSZ);
   keys("MaxDispersiveCourantSZ", MaxDispersiveCourantSZ);
 }

@@ -11,10 +11,7 @@ namespace tervane {
 
 class CCompControlParaTimeStepKvf : public CTvnKvfBase {
  public:
-  explicit CCompControlParaTimeStepKvf(CYbSEKvfBase* parent)
-      : CTvnKvfBase("Time step control", "CompControlParaTimeStep", parent) {
-    SetPage(kTimeStepPage);
-  }
+  explicit CCompControlParaTimeStepKvf(CYbSEKvfBase* parent);
 
   float InitialTimeStep = 6;
   float MaxAllowedOLTimeStep = 0.5f;
@@ -24,8 +21,6 @@ class CCompControlParaTimeStepKvf : public CTvnKvfBase {
   float MaxPrecDepthPerTimeStep = 10;
   float MaxInfiltDepthPerTimeStep = 10;
   float PrecThresholdRate = 0.1f;  ///< Precipitation rate that requires its own time step.
-
-  int IsDlgUsedInSetup() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;

@@ -26,7 +26,7 @@ std::string TitleOf(const CYbSEKvfBase& node) {
 
 DomainSource DomainOf(const CYbSEKvfBase& root) {
   DomainSource source;
-  const auto* domain = root.Important<CCatchmentKvf>("CATCHMENT");
+  const auto* domain = root.Important(kDomain);
   if (!domain) return source;
   source.isShape = domain->Type == CCatchmentKvf::kShapeFile;
   const FileName& file = source.isShape ? domain->ShapeFile().File : domain->GridFile().File;
@@ -39,7 +39,7 @@ DomainSource DomainOf(const CYbSEKvfBase& root) {
 }
 
 std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
-  const auto* period = root.Important<CSimPeriodKvf>("SIMPERIOD");
+  const auto* period = root.Important(kSimulationPeriod);
   if (!period) return std::nullopt;
   const CYbDateTime start = period->GetSimStartDate(), end = period->SIMEND;
   if (!start.IsValid() || !end.IsValid() || end <= start) return std::nullopt;

@@ -9,9 +9,10 @@
 
 #include "geometry/grid_polygons.h"
 #include "platform/file_cache.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/units.h"
-#include "simspec/model_components.h"
+#include "simspec/conditions.h"
 #include "spatial/domain.h"
 #include "spatial/pages.h"
 
@@ -19,7 +20,12 @@ namespace tervane {
 
 namespace {
 
-constexpr int kHeightAboveGround = 100364;
+constexpr KeyChoice kSources[] = {{CData2DKvf::kUniform, "Uniform"},
+                                  {CData2DKvf::kGridFile, "Grid file (.nds2)"},
+                                  {CData2DKvf::kShapeFile, "Point/Line (.shp)"},
+                                  {CData2DKvf::kXyzFile, "Point XYZ(.txt)"}};
+constexpr KeyChoice kInterpolationMethods[] = {
+    {0, "Bilinear"}, {1, "Triangular"}, {2, "Inverse Distance"}, {3, "Inverse Distance Squared"}};
 
 int FirstUnit(int itemType) {
   const ItemType* found = FindItemType(itemType);
@@ -39,7 +45,7 @@ FileResult BuildGrid(const GridSource& source, ProgressPart progress, CTvn2DOrth
   // The file's own geometry counts; nothing is resampled.
   if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid, progress);
   const bool isXyz = source.type == CData2DKvf::kXyzFile;
-  if (source.itemType == kCodeItemType && !isXyz) {
+  if (source.itemType == quantity::kCode && !isXyz) {
     PolygonFile polygons;
     polygons.path = source.file;
     polygons.attribute = source.attribute;
@@ -67,7 +73,7 @@ GridSource CodesOfGrid(const CTvnData2DNdsFile& file) {
   source.file = file.File.Absolute();
   source.stamps = StampsOf(source.file);
   source.item = file.SelectedItem();
-  source.itemType = kCodeItemType;
+  source.itemType = quantity::kCode;
   return source;
 }
 
@@ -78,39 +84,49 @@ GridSource CodesOfPolygons(const CData2DShpFile& file, int axisUnit, std::string
   source.stamps = StampsOfShape(source.file);
   source.attribute = file.Attribute();
   source.axisUnit = axisUnit;
-  source.itemType = kCodeItemType;
+  source.itemType = quantity::kCode;
   source.gapFill = std::move(gapFill);
-  if (const auto* domain = file.Important<CCatchmentKvf>("CATCHMENT")) source.geometry = domain->GetModelGeometry();
+  if (const auto* domain = file.Important(kDomain)) source.geometry = domain->GetModelGeometry();
   return source;
 }
 
 CData2DKvf::CData2DKvf(Data2DKind kind, CYbSEKvfBase* parent)
     : CTvnKvfBase(kind.title, kind.section, parent),
       FixedValue(kind.fixedValue),
-      ShapeAxisUnit(FirstUnit(kCoordinateItemType)),
+      ShapeAxisUnit(FirstUnit(quantity::kMapCoordinate)),
       ShapeItemUnit(FirstUnit(kind.itemType)),
       RelativeToGround(kind.relativeToGround == Data2DKind::RelativeToGround::On),
       kind_(std::move(kind)),
       gridFile_(NewChild<CTvnData2DNdsFile>(kind_.itemType)),
       shapeFile_(NewChild<CData2DShpFile>()),
       xyzFile_(NewChild<CData2DXyzFile>()) {
+  SetClassName(kind_.className);
+  SetAbbreviatedTitle(kind_.shortTitle);
   SetPage(kData2DPage);
+  gridFile_->UsedWhen(Is(Type, kGridFile));
+  shapeFile_->UsedWhen(Is(Type, kShapeFile));
+  xyzFile_->UsedWhen(Is(Type, kXyzFile));
   shapeFile_->SetPolygonShape(IsCode());
   shapeFile_->SetLineShape(!IsCode());
   shapeFile_->SetPointShape(!IsCode());
   IsCode() ? shapeFile_->UseWholeField() : shapeFile_->UseRealField();
   shapeFile_->SetAxisUnit(ShapeAxisUnit);
   xyzFile_->SetAxisUnit(ShapeAxisUnit);
-  ValidateData();
+  gridFile_->SetItemTypeBy([this] { return GetItemType(); });
+}
+
+CData2DKvf::CData2DKvf(Data2DKind kind, Condition takesPart, CYbSEKvfBase* parent)
+    : CData2DKvf(std::move(kind), parent) {
+  TakesPartWhen(std::move(takesPart));
 }
 
 void CData2DKvf::ExchangeKeys(KeyExchange& keys) {
-  keys("Type", Type);
-  keys("FixedValue", FixedValue);
-  keys("InterpMethod", InterpMethod);
+  keys("Type", Type).OneOf(kSources);
+  keys("FixedValue", FixedValue).Quantity(GetItemType());
+  keys("InterpMethod", InterpMethod).OneOf(kInterpolationMethods);
   // Files of before version 4 were all interpolated bilinearly, whatever they say.
   if (keys.Section() && keys.DocVersion() < 4) InterpMethod = 0;
-  keys("SearchRadius", SearchRadius);
+  keys("SearchRadius", SearchRadius).Quantity(quantity::kHorizontalLength);
   keys("ShowGridData", ShowGridData);
   keys("ShowShapeData", ShowShapeData);
   keys("ShapeAxisUnit", ShapeAxisUnit);
@@ -119,15 +135,7 @@ void CData2DKvf::ExchangeKeys(KeyExchange& keys) {
 }
 
 int CData2DKvf::GetItemType() const {
-  return HasRelativeToGround() && RelativeToGround ? kHeightAboveGround : kind_.itemType;
-}
-
-int CData2DKvf::ValidateData() {
-  gridFile_->SetItemType(GetItemType());
-  gridFile_->SetFileUsed(Type == kGridFile);
-  shapeFile_->SetValidateFlag(Type == kShapeFile);
-  xyzFile_->SetFileUsed(Type == kXyzFile);
-  return 1;
+  return HasRelativeToGround() && RelativeToGround ? quantity::kHeightAboveGround : kind_.itemType;
 }
 
 std::string CData2DKvf::GetNdsItemName() const {
@@ -151,7 +159,7 @@ GridSource CData2DKvf::CurrentSource() const {
   source.axisUnit = ShapeAxisUnit;
   source.itemUnit = ShapeItemUnit;
   source.itemType = kind_.itemType;
-  if (const auto* domain = Important<CCatchmentKvf>("CATCHMENT")) source.geometry = domain->GetModelGeometry();
+  if (const auto* domain = Important(kDomain)) source.geometry = domain->GetModelGeometry();
   return source;
 }
 
@@ -224,22 +232,47 @@ void CData2DKvf::SetShapeDataValid(int valid) {
 
 // ---- Who takes part
 
-int CTopographyKvf::IsDlgUsedInSetup() {
-  const CModelCompKvf& c = ModelCompOf(*this);
-  const bool allBySubcatchments = c.OL && c.OL_ModelType == 1 && c.SZ && c.SZ_ModelType == 1;
-  return EngineOf(*this) != kEngineTervane || c.UZ || !allBySubcatchments;
+CData2DKvf* NewTopography(CYbSEKvfBase& parent) {
+  const Condition allBySubcatchments =
+      Component(&CModelCompKvf::OL) && Method(&CModelCompKvf::OL_ModelType, kSubcatchmentOverland) &&
+      Component(&CModelCompKvf::SZ) && Method(&CModelCompKvf::SZ_ModelType, kLinearReservoir);
+  return parent.NewChild<CData2DKvf>(Data2DKind{.className = "CTopographyKvf",
+                                                .section = "Topography",
+                                                .title = "Topography",
+                                                .itemType = quantity::kElevation,
+                                                .fixedValue = 10},
+                                     !OwnEngine() || Component(&CModelCompKvf::UZ) || !allBySubcatchments);
 }
 
-int CDummyEvapoTransKvf::IsDlgUsedInSetup() { return EngineOf(*this) == kEngineTervane && !ModelCompOf(*this).ET; }
-
-int CDummySatZoneKvf::IsDlgUsedInSetup() {
-  const CModelCompKvf& c = ModelCompOf(*this);
-  return EngineOf(*this) == kEngineTervane && c.UZ && (!c.SZ || c.SZ_ModelType == 1);
+CData2DKvf* NewNetRainfallFraction(CYbSEKvfBase& parent) {
+  return parent.NewChild<CData2DKvf>(Data2DKind{.className = "CDummyEvapoTransKvf",
+                                                .section = "NetRainfallFraction",
+                                                .title = "Net Rainfall Fraction",
+                                                .itemType = quantity::kFraction,
+                                                .fixedValue = 1},
+                                     OwnEngine() && !Component(&CModelCompKvf::ET));
 }
 
-int CDummyUnSatZoneKvf::IsDlgUsedInSetup() {
-  const CModelCompKvf& c = ModelCompOf(*this);
-  return EngineOf(*this) == kEngineTervane && !c.UZ && c.SZ && c.OL;
+CData2DKvf* NewGroundwaterTable(CYbSEKvfBase& parent) {
+  return parent.NewChild<CData2DKvf>(
+      Data2DKind{.className = "CDummySatZoneKvf",
+                 .section = "GroundwaterTable",
+                 .title = "Groundwater table for lower UZ boundary",
+                 .itemType = quantity::kElevation,
+                 .fixedValue = -0.9F,
+                 .relativeToGround = Data2DKind::RelativeToGround::On},
+      OwnEngine() && Component(&CModelCompKvf::UZ) &&
+          (!Component(&CModelCompKvf::SZ) || Method(&CModelCompKvf::SZ_ModelType, kLinearReservoir)));
+}
+
+CData2DKvf* NewInfiltrationFraction(CYbSEKvfBase& parent) {
+  return parent.NewChild<CData2DKvf>(
+      Data2DKind{.className = "CDummyUnSatZoneKvf",
+                 .section = "InfiltrationFraction",
+                 .title = "Infiltration Fraction",
+                 .itemType = quantity::kFraction,
+                 .fixedValue = 1},
+      OwnEngine() && !Component(&CModelCompKvf::UZ) && Component(&CModelCompKvf::SZ) && Component(&CModelCompKvf::OL));
 }
 
 }  // namespace tervane

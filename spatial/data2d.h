@@ -13,19 +13,22 @@
 #include "data/grid_files.h"
 #include "geometry/grid.h"
 #include "geometry/grid_interpolation.h"
+#include "platform/item_types.h"
 #include "spatial/data_use.h"
 #include "spatial/file_nodes.h"
 
 namespace tervane {
 
-/// What makes one quantity of this kind differ from the next.
+/// What makes one quantity of this kind differ from the next: a row, written where its owner makes it.
 struct Data2DKind {
+  std::string_view className;
   std::string section;
   std::string title;
-  int itemType;          ///< `kCodeItemType` for codes, `kUndefinedItemType` for none.
+  int itemType;          ///< `quantity::kCode` for codes, `quantity::kUndefined` for none.
   float fixedValue = 0;  ///< The default.
   enum class RelativeToGround { Never, Off, On } relativeToGround = RelativeToGround::Never;  ///< On, Off: the default.
   bool mayBeScattered = true;  ///< Whether shape and XYZ files are offered.
+  std::string shortTitle = {};
 };
 
 /// Makes the grid of a source; it asks no node, so that another thread may do it. `grid` stays as it was on failure.
@@ -39,6 +42,8 @@ GridSource CodesOfPolygons(const CData2DShpFile& file, int axisUnit, std::string
 class CData2DKvf : public CTvnKvfBase, public CellValues {
  public:
   CData2DKvf(Data2DKind kind, CYbSEKvfBase* parent);
+  /// Makes one that takes part by a rule.
+  CData2DKvf(Data2DKind kind, Condition takesPart, CYbSEKvfBase* parent);
 
   enum Source : int { kUniform = 0, kGridFile = 1, kShapeFile = 2, kXyzFile = 3 };
 
@@ -54,7 +59,7 @@ class CData2DKvf : public CTvnKvfBase, public CellValues {
 
   const Data2DKind& Kind() const { return kind_; }
   bool HasRelativeToGround() const { return kind_.relativeToGround != Data2DKind::RelativeToGround::Never; }
-  bool IsCode() const { return kind_.itemType == kCodeItemType; }
+  bool IsCode() const { return kind_.itemType == quantity::kCode; }
   bool IsInterpolated() const { return !IsCode(); }
   /// The item type of the values as they are: heights above ground where they are relative to it.
   virtual int GetItemType() const;
@@ -82,8 +87,6 @@ class CData2DKvf : public CTvnKvfBase, public CellValues {
   void SetGridDataValid(int valid);
   void SetShapeDataValid(int valid);
 
-  int ValidateData() override;
-
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 
@@ -102,36 +105,14 @@ class CData2DKvf : public CTvnKvfBase, public CellValues {
   std::optional<Kept<CTvnShapeData>> keptShapes_;
 };
 
-/// The ground surface.
-class CTopographyKvf : public CData2DKvf {
- public:
-  explicit CTopographyKvf(CYbSEKvfBase* parent) : CData2DKvf({"Topography", "Topography", 100180, 10.0F}, parent) {}
-  int IsDlgUsedInSetup() override;
-};
+/// The ground surface, a child of the root.
+CData2DKvf* NewTopography(CYbSEKvfBase& parent);
+inline constexpr ImportantName<CData2DKvf> kTopography{"TOPOGRAPHY"};
 
 // What stands in for a process that is not modelled.
 
-class CDummyEvapoTransKvf : public CData2DKvf {
- public:
-  explicit CDummyEvapoTransKvf(CYbSEKvfBase* parent)
-      : CData2DKvf({"NetRainfallFraction", "Net Rainfall Fraction", 100239, 1.0F}, parent) {}
-  int IsDlgUsedInSetup() override;
-};
-
-class CDummySatZoneKvf : public CData2DKvf {
- public:
-  explicit CDummySatZoneKvf(CYbSEKvfBase* parent)
-      : CData2DKvf({"GroundwaterTable", "Groundwater table for lower UZ boundary", 100180, -0.9F,
-                    Data2DKind::RelativeToGround::On},
-                   parent) {}
-  int IsDlgUsedInSetup() override;
-};
-
-class CDummyUnSatZoneKvf : public CData2DKvf {
- public:
-  explicit CDummyUnSatZoneKvf(CYbSEKvfBase* parent)
-      : CData2DKvf({"InfiltrationFraction", "Infiltration Fraction", 100239, 1.0F}, parent) {}
-  int IsDlgUsedInSetup() override;
-};
+CData2DKvf* NewNetRainfallFraction(CYbSEKvfBase& parent);
+CData2DKvf* NewGroundwaterTable(CYbSEKvfBase& parent);
+CData2DKvf* NewInfiltrationFraction(CYbSEKvfBase& parent);
 
 }  // namespace tervane

@@ -8,34 +8,43 @@
 #include <fmt/format.h>
 
 #include "geometry/cart.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/units.h"
 #include "spatial/pages.h"
 
 namespace tervane {
 
+namespace {
+
+constexpr KeyChoice kSources[] = {{CCatchmentKvf::kGridFile, "Catchment defined by Nds File"},
+                                  {CCatchmentKvf::kShapeFile, "Catchment defined by Shape File"}};
+
+}  // namespace
+
 CCatchmentKvf::CCatchmentKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Model Domain and Grid", "Catchment", parent),
       MapProjShp(CYbMapProjection::IDtoProjectionString(1)),
-      ShapeAxisUnit(BaseUnit(*FindItemType(kCoordinateItemType)).key),
-      gridFile_(NewChild<CTvnData2DNdsFile>(kCodeItemType)),
+      ShapeAxisUnit(BaseUnit(*FindItemType(quantity::kMapCoordinate)).key),
+      gridFile_(NewChild<CTvnData2DNdsFile>(quantity::kCode)),
       shapeFile_(NewChild<CData2DShpFile>()) {
   SetPage(kCatchmentPage);
   gridFile_->SetDomainCheck(0);
   shapeFile_->SetAxisUnit(ShapeAxisUnit);
   shapeFile_->SetPolygonShape(1);
-  shapeFile_->SetValidateFlag(0);
+  gridFile_->UsedWhen(Is(Type, kGridFile));
+  shapeFile_->UsedWhen(Is(Type, kShapeFile));
 }
 
 void CCatchmentKvf::ExchangeKeys(KeyExchange& keys) {
-  keys.FromOne("type", Type);
+  keys.FromOne("type", Type).OneOf(kSources);
   keys("nxShp", nxShp);
   keys("nyShp", nyShp);
-  keys("sizeShp", sizeShp);
-  keys("x0Shp", x0Shp);
-  keys("y0Shp", y0Shp);
+  keys("sizeShp", sizeShp).Quantity(quantity::kHorizontalLength);
+  keys("x0Shp", x0Shp).Quantity(quantity::kHorizontalLength);
+  keys("y0Shp", y0Shp).Quantity(quantity::kHorizontalLength);
   keys("MapProjShp", MapProjShp);
-  keys("rotationShp", rotationShp);
+  keys("rotationShp", rotationShp).Unit("[Deg, Counter clockwise]");
   keys("ShapeAxisUnit", ShapeAxisUnit);
 }
 
@@ -116,8 +125,6 @@ bool CCatchmentKvf::ChooseShapeFile(FileName file, int axisUnit, std::string& pr
 }
 
 int CCatchmentKvf::ValidateData() {
-  gridFile_->SetFileUsed(Type == kGridFile);
-  shapeFile_->SetValidateFlag(Type == kShapeFile);
   if (Type == kGridFile) {
     DomainFileFacts facts;
     switch (ReadDomainFacts(gridFile_->File.Absolute(), facts)) {
@@ -142,7 +149,7 @@ int CCatchmentKvf::ValidateData() {
       return 0;
     }
   }
-  if (auto* maps = dynamic_cast<DomainFollower*>(ImportantNode("OVERLAY_DATA"))) maps->AdoptDomain(GetEnvelope());
+  if (auto* maps = Important(kDomainFollower)) maps->AdoptDomain(GetEnvelope());
   const GridGeometry geometry = GetModelGeometry();
   if (const std::string problem = geometry.Problem(); !problem.empty())
     AddWarning("The grid of the model cannot be made", Type == kShapeFile ? "nxShp" : "FILE_NAME", problem);

@@ -18,6 +18,7 @@ class DomainFollower {
   virtual ~DomainFollower() = default;
   virtual void AdoptDomain(const Envelope& domain) = 0;
 };
+inline constexpr ImportantName<DomainFollower> kDomainFollower{"OVERLAY_DATA"};
 
 /// The model domain and its grid: a grid file, or the polygons of a shape file on a grid that is given here. A cell of
 /// the domain is empty outside, 1 inside, 2 at the outer boundary.
@@ -80,5 +81,6 @@ class CCatchmentKvf : public CTvnKvfBase {
   ShapeSource madeOf_;
   std::shared_ptr<ComputedGrid> made_;
 };
+inline constexpr ImportantName<CCatchmentKvf> kDomain{"CATCHMENT"};
 
 }  // namespace tervane

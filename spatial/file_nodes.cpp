@@ -3,6 +3,7 @@
 #include "spatial/file_nodes.h"
 
 #include "platform/file_cache.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
 #include "simspec/periods.h"
 #include "spatial/placement.h"
@@ -14,6 +15,10 @@ namespace {
 constexpr const char* kNotValid = "File is not valid";
 constexpr const char* kNoFile = "no file is chosen";
 
+std::vector<int> AsItemTypes(int itemType) {
+  return itemType == 0 || itemType == quantity::kUndefined ? std::vector<int>() : std::vector{itemType};
+}
+
 /// What a user should know of where a valid file lies.
 std::vector<Finding> MisplacementOf(const CYbSEKvfBase& node, const FileUse& use) {
   const std::optional<GridGeometry> domain = use.isOverArea ? DomainGeometryOf(node) : std::nullopt;
@@ -22,26 +27,22 @@ std::vector<Finding> MisplacementOf(const CYbSEKvfBase& node, const FileUse& use
 
 }  // namespace
 
-void DataFileNode::SetItemType(int itemType) {
-  ItemTypes.clear();
-  if (itemType != 0 && itemType != kUndefinedItemType) ItemTypes.push_back(itemType);
-}
+void DataFileNode::SetItemType(int itemType) { ItemTypes = AsItemTypes(itemType); }
 
 DataFileRequest DataFileNode::SetUpNdsValidation() const {
   DataFileRequest request;
-  request.itemTypes = ItemTypes;
+  request.itemTypes = itemType_ ? AsItemTypes(itemType_()) : ItemTypes;
   request.dimensions = dimensions_;
   return request;
 }
 
 DataFileRequest DataFileNode::WithSimulationPeriod(DataFileRequest request) const {
-  if (const auto* period = Important<CSimPeriodKvf>("SIMPERIOD"))
-    request.period = {period->GetSimStartDate(), period->SIMEND};
+  if (const auto* period = Important(kSimulationPeriod)) request.period = {period->GetSimStartDate(), period->SIMEND};
   return request;
 }
 
 int DataFileNode::ValidateData() {
-  if (FileUsed == 0) return 1;
+  if (!IsFileUsed()) return 1;
   if (File.IsEmpty()) {
     AddError(kNotValid, "FILE_NAME", kNoFile);
     return 0;
@@ -60,7 +61,7 @@ int DataFileNode::ValidateData() {
 }
 
 std::optional<FileUse> DataFileNode::UsedFile() const {
-  if (FileUsed == 0) return std::nullopt;
+  if (!IsFileUsed()) return std::nullopt;
   FileUse use;
   use.path = File.IsEmpty() ? std::string() : File.Absolute();
   use.stamps = StampsOf(use.path);
@@ -88,7 +89,7 @@ void CData2DShpFile::Choose(FileName file, std::string attribute) {
 }
 
 int CData2DShpFile::ValidateData() {
-  if (ValidateFlag == 0) return 1;
+  if (!IsFileUsed()) return 1;
   const FileResult checked =
       File.IsEmpty() ? FileResult{kNoFile, {}} : CheckShapeFile(File.Absolute(), request_, Attribute());
   if (!checked.Ok()) {
@@ -102,7 +103,7 @@ int CData2DShpFile::ValidateData() {
 }
 
 std::optional<FileUse> CData2DShpFile::UsedFile() const {
-  if (ValidateFlag == 0) return std::nullopt;
+  if (!IsFileUsed()) return std::nullopt;
   FileUse use;
   use.kind = FileUse::Kind::Shape;
   use.path = File.IsEmpty() ? std::string() : File.Absolute();
@@ -114,7 +115,7 @@ std::optional<FileUse> CData2DShpFile::UsedFile() const {
 }
 
 std::optional<FileUse> CData2DXyzFile::UsedFile() const {
-  if (fileUsed_ == 0) return std::nullopt;
+  if (!usedWhen_.Holds(*this)) return std::nullopt;
   FileUse use;
   use.kind = FileUse::Kind::Points;
   use.path = File.IsEmpty() ? std::string() : File.Absolute();

@@ -5,10 +5,12 @@
 // not in use is never an error.
 #pragma once
 
+#include <functional>
 #include <optional>
 #include <string>
 #include <vector>
 
+#include "core/condition.h"
 #include "core/file_selection.h"
 #include "data/datafile_request.h"
 #include "geometry/shapes.h"
@@ -22,13 +24,18 @@ class DataFileNode : public YbSENdsSelection, public FileUser {
   DataFileNode(std::string title, std::string section, int dimensions, CYbSEKvfBase* parent)
       : YbSENdsSelection(std::move(title), std::move(section), parent), dimensions_(dimensions) {}
 
-  int FileUsed = 1;            ///< Not stored: what the owner says. 0 switches the validation off.
+  int FileUsed = 1;            ///< Not stored: 0 switches the validation off.
   int DomainCheck = 1;         ///< Not stored: a file of grids is to lie where the model domain lies.
   std::vector<int> ItemTypes;  ///< Not stored: what the selected item may be; empty for anything.
 
   void SetItemType(int itemType);
+  /// An item type that the owner's values decide, asked whenever it matters.
+  void SetItemTypeBy(std::function<int()> itemType) { itemType_ = std::move(itemType); }
   void SetMultiItemTypes(std::vector<int> itemTypes) { ItemTypes = std::move(itemTypes); }
   void SetFileUsed(int used) { FileUsed = used; }
+  /// The owner's rule, asked whenever it matters.
+  void UsedWhen(Condition rule) { usedWhen_ = std::move(rule); }
+  bool IsFileUsed() const { return FileUsed != 0 && usedWhen_.Holds(*this); }
   void SetDomainCheck(int check) { DomainCheck = check; }
 
   /// The number of the selected item; item 1 where none is selected.
@@ -56,6 +63,8 @@ class DataFileNode : public YbSENdsSelection, public FileUser {
 
  private:
   int dimensions_;
+  Condition usedWhen_;
+  std::function<int()> itemType_;
 };
 
 /// A grid file.
@@ -113,6 +122,9 @@ class CData2DShpFile : public YbSEShpSelection, public FileUser {
   int ValidateFlag = 1;  ///< Not stored; 0 switches the validation off.
 
   void SetValidateFlag(int validate) { ValidateFlag = validate; }
+  /// The owner's rule, asked whenever it matters.
+  void UsedWhen(Condition rule) { usedWhen_ = std::move(rule); }
+  bool IsFileUsed() const { return ValidateFlag != 0 && usedWhen_.Holds(*this); }
   /// The owner's key of the unit of coordinates; metres where none is told.
   void SetAxisUnit(const int& unit) { axisUnit_ = &unit; }
   void SetPolygonShape(int accepted) { request_.polygons = accepted != 0; }
@@ -132,6 +144,7 @@ class CData2DShpFile : public YbSEShpSelection, public FileUser {
 
  private:
   ShapeRequest request_;
+  Condition usedWhen_;
   const int* axisUnit_ = nullptr;
 };
 
@@ -142,7 +155,8 @@ class CData2DXyzFile : public CTvnKvfBase, public FileUser {
 
   FileName File;
 
-  void SetFileUsed(int used) { fileUsed_ = used; }
+  /// The owner's rule, asked whenever it matters.
+  void UsedWhen(Condition rule) { usedWhen_ = std::move(rule); }
   void SetAxisUnit(const int& unit) { axisUnit_ = &unit; }
   std::optional<FileUse> UsedFile() const override;
 
@@ -150,7 +164,7 @@ class CData2DXyzFile : public CTvnKvfBase, public FileUser {
   void ExchangeKeys(KeyExchange& keys) override;
 
  private:
-  int fileUsed_ = 0;
+  Condition usedWhen_;
   const int* axisUnit_ = nullptr;
 };
 

@@ -7,15 +7,15 @@
 
 #include "core/list.h"
 #include "platform/file_cache.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
+#include "simspec/conditions.h"
 #include "spatial/data2d.h"
 #include "spatial/pages.h"
 
 namespace tervane {
 
 namespace {
-
-constexpr int kPrecipitationDepth = 100004;  ///< What a file of any forcing may hold besides its own quantity.
 
 /// A file over time, of a forcing as a whole or of one of its stations.
 ForcingSeries SeriesOf(const DataFileNode& file) {
@@ -41,22 +41,20 @@ ForcingSeries SeriesOf(int type, float value, const DataFileNode& file) {
 CGlobalKvf::CGlobalKvf(std::string title, std::string section, std::vector<int> itemTypes, CYbSEKvfBase* parent)
     : CTvnKvfBase(std::move(title), std::move(section), parent), file_(NewChild<CFMData0DFile>("TIME_SERIES_FILE")) {
   file_->SetMultiItemTypes(std::move(itemTypes));
-  file_->SetFileUsed(0);
+  file_->UsedWhen(Is(TYPE, kTimeVarying));
 }
 
 void CGlobalKvf::ExchangeKeys(KeyExchange& keys) {
-  keys("FIXED_VALUE", FIXED_VALUE);
-  keys.FromOne("TYPE", TYPE);
+  keys("FIXED_VALUE", FIXED_VALUE).Quantity(file_->ItemTypes.front());
+  keys.FromOne("TYPE", TYPE).OneOf(kTemporalDistributions);
 }
 
 CStationBasedKvf::CStationBasedKvf(CFMSEKvfBase* parent)
     : CTvnKvfBase("Station Based", "STATION_BASED", parent),
-      ShapeAxisUnit(BaseUnit(*FindItemType(kCoordinateItemType)).key),
+      ShapeAxisUnit(BaseUnit(*FindItemType(quantity::kMapCoordinate)).key),
       owner_(*parent),
-      gridFile_(NewChild<CTvnData2DNdsFile>(kCodeItemType)),
+      gridFile_(NewChild<CTvnData2DNdsFile>(quantity::kCode)),
       shapeFile_(NewChild<CData2DShpFile>()) {
-  gridFile_->SetFileUsed(0);
-  shapeFile_->SetValidateFlag(0);
   shapeFile_->SetPolygonShape(1);
   shapeFile_->SetAxisUnit(ShapeAxisUnit);
 }
@@ -68,7 +66,7 @@ GridSource CStationBasedKvf::CurrentSource() const {
 
 void CStationBasedKvf::ExchangeKeys(KeyExchange& keys) {
   keys.WriteOnly("NO_TIMESERIES", static_cast<int>(ZoneItems(owner_).size()));
-  keys.FromOne("TYPE", TYPE);
+  keys.FromOne("TYPE", TYPE).OneOf(kAreaSources);
   keys("ShapeAxisUnit", ShapeAxisUnit);
   keys("ShapeGapFillName", ShapeGapFillName);
 }
@@ -88,9 +86,7 @@ void CStationBasedKvf::ReadData(KvfNode* section) {
 }
 
 CFullyDistributedKvf::CFullyDistributedKvf(int itemType, CYbSEKvfBase* parent)
-    : CTvnKvfBase("Fully Distributed", "FULLY_DISTRIBUTED", parent), gridFile_(NewChild<CFMData2DNdsFile>(itemType)) {
-  gridFile_->SetFileUsed(0);
-}
+    : CTvnKvfBase("Fully Distributed", "FULLY_DISTRIBUTED", parent), gridFile_(NewChild<CFMData2DNdsFile>(itemType)) {}
 
 void CFullyDistributedKvf::ReadData(KvfNode* section) {
   CTvnKvfBase::ReadData(section);
@@ -105,16 +101,19 @@ C2DStationBasedDataTimeSeriesKvf::C2DStationBasedDataTimeSeriesKvf(const Forcing
       file_(NewChild<CFMData0DFile>("TIME_SERIES_FILE")) {
   SetPage(*kind.stationPage);
   SetAbbreviatedTitle(NAME);
+  SetClassName(kind.stationClassName);
   file_->SetMultiItemTypes(kind.itemTypes);
+  file_->UsedWhen(Is(TYPE, kTimeVarying));
+  TakesPartWhen(IsInParent(&C2DStationBasedDataKvf::DistributionType, {C2DStationBasedDataKvf::kStationBased}));
 }
 
 void C2DStationBasedDataTimeSeriesKvf::ExchangeKeys(KeyExchange& keys) {
   keys("NAME", NAME);
   keys("GRIDCODEID", GRIDCODEID);
   keys.WriteOnly("GRIDCODE", StationCode());
-  keys("FIXED_VALUE", FIXED_VALUE);
-  keys.FromOne("TYPE", TYPE);
-  if (hasElevation_) keys("Elevation", Elevation);
+  keys("FIXED_VALUE", FIXED_VALUE).Quantity(file_->ItemTypes.front());
+  keys.FromOne("TYPE", TYPE).OneOf(kTemporalDistributions);
+  if (hasElevation_) keys("Elevation", Elevation).Quantity(quantity::kElevation);
 }
 
 void C2DStationBasedDataTimeSeriesKvf::ReadData(KvfNode* section) {
@@ -134,26 +133,15 @@ int C2DStationBasedDataTimeSeriesKvf::GetNumberWhatAmI() const {
   return parent->GetNumberWhatIs(this) - others;
 }
 
-int C2DStationBasedDataTimeSeriesKvf::IsDlgUsedInSetup() {
-  const auto* owner = dynamic_cast<const C2DStationBasedDataKvf*>(GetParent());
-  return !owner || owner->DistributionType == C2DStationBasedDataKvf::kStationBased;
-}
-
-int C2DStationBasedDataTimeSeriesKvf::ValidateData() {
-  file_->SetFileUsed(TYPE == kTimeVarying);
-  return 1;
-}
-
 // ---- The forcing
 
-C2DStationBasedDataKvf::C2DStationBasedDataKvf(int itemType, std::string title, std::string section,
-                                               CYbSEKvfBase* parent)
-    : C2DStationBasedDataKvf({.itemTypes = {itemType, kPrecipitationDepth},
-                              .valueTypes = kMeansOrSums,
-                              .stationTitle = "2D Station Based Data",
-                              .page = &kStationBasedDataPage,
-                              .stationPage = &kStationPage},
-                             std::move(title), std::move(section), parent) {}
+ForcingKind C2DStationBasedDataKvf::PlainKind(int itemType) {
+  return {.itemTypes = {itemType, quantity::kRainfall},
+          .valueTypes = kMeansOrSums,
+          .stationTitle = "2D Station Based Data",
+          .page = &kStationBasedDataPage,
+          .stationPage = &kStationPage};
+}
 
 C2DStationBasedDataKvf::C2DStationBasedDataKvf(ForcingKind kind, std::string title, std::string section,
                                                CYbSEKvfBase* parent)
@@ -164,13 +152,19 @@ C2DStationBasedDataKvf::C2DStationBasedDataKvf(ForcingKind kind, std::string tit
   stations_ = stations.get();
   AddChild(std::move(stations));
   fully_ = NewChild<CFullyDistributedKvf>(GetItemType());
+  SetClassName(kind_.className);
+  SetAbbreviatedTitle(kind_.shortTitle);
   SetPage(*kind_.page);
-  C2DStationBasedDataKvf::ValidateData();
+  const Condition isStationBased = Is(DistributionType, kStationBased);
+  global_->SeriesFile().UsedWhen(Is(DistributionType, kUniform) && Is(global_->TYPE, CGlobalKvf::kTimeVarying));
+  stations_->GridFile().UsedWhen(isStationBased && Is(stations_->TYPE, CStationBasedKvf::kGridCodes));
+  stations_->ShapeFile().UsedWhen(isStationBased && Is(stations_->TYPE, CStationBasedKvf::kPolygons));
+  fully_->GridFile().UsedWhen(Is(DistributionType, kFullyDistributed));
 }
 
 void C2DStationBasedDataKvf::ExchangeKeys(KeyExchange& keys) {
-  keys.FromOne("DistributionType", DistributionType);
-  if (HasElevation()) keys("Elevation", Elevation);
+  keys.FromOne("DistributionType", DistributionType).OneOf(kDistributions);
+  if (HasElevation()) keys("Elevation", Elevation).Quantity(quantity::kElevation);
 }
 
 std::shared_ptr<CFMSEKvfGroupBase> C2DStationBasedDataKvf::CreateStationItem() {
@@ -232,14 +226,9 @@ Forcing C2DStationBasedDataKvf::CurrentForcing() const {
   return forcing;
 }
 
-int C2DStationBasedDataKvf::IsDlgUsedInSetup() { return GetParent() ? GetParent()->IsDlgUsedInSetup() : 1; }
-
-int C2DStationBasedDataKvf::ValidateData() {
-  global_->SeriesFile().SetFileUsed(DistributionType == kUniform && global_->TYPE == CGlobalKvf::kTimeVarying);
-  stations_->GridFile().SetFileUsed(UsesGridCodes());
-  stations_->ShapeFile().SetValidateFlag(UsesPolygons());
-  fully_->GridFile().SetFileUsed(DistributionType == kFullyDistributed);
-  return 1;
+int C2DStationBasedDataKvf::IsDlgUsedInSetup() {
+  if (TakesPartRule().IsAlways() && GetParent()) return GetParent()->IsDlgUsedInSetup();
+  return CFMSEKvfBase::IsDlgUsedInSetup();
 }
 
 CTimeseriesConstKvf::CTimeseriesConstKvf(int itemType, CYbSEKvfBase* parent)
@@ -255,11 +244,6 @@ Forcing CTimeseriesConstKvf::CurrentForcing() const {
   forcing.itemType = itemType_;
   forcing.series.push_back(SeriesOf(global_->TYPE, global_->FIXED_VALUE, global_->SeriesFile()));
   return forcing;
-}
-
-int CTimeseriesConstKvf::ValidateData() {
-  global_->SeriesFile().SetFileUsed(global_->TYPE == CGlobalKvf::kTimeVarying);
-  return 1;
 }
 
 }  // namespace tervane

@@ -22,14 +22,23 @@ inline const std::vector<int> kMeansOrSums{static_cast<int>(ValueType::MeanStep)
 
 /// What makes one forcing differ from the next.
 struct ForcingKind {
+  std::string_view className = {};         ///< Of the forcing; that of its type when empty.
+  std::string_view stationClassName = {};  ///< The same of its stations.
+  std::string shortTitle = {};
   std::vector<int> itemTypes;   ///< What its files may hold. The first is that of values typed on pages.
   std::vector<int> valueTypes;  ///< Of new files, in the order of preference; empty for any.
   std::string stationTitle;
   /// What is corrected for elevation, in words; empty for a forcing without elevations.
   std::string correctable = {};
+  Condition correctedWhen = {};  ///< Asked of the forcing; only where something is correctable.
   const PageClass* page;
   const PageClass* stationPage;
 };
+
+/// Texts of a value's two forms in time, and of the two sources of areas; in the file one higher.
+inline constexpr KeyChoice kTemporalDistributions[] = {{0, "Constant"}, {1, "Time varying (.nds0)"}};
+inline constexpr KeyChoice kAreaSources[] = {{0, "Grid codes (.nds2)"}, {1, "Polygons (.shp)"}};
+inline constexpr KeyChoice kDistributions[] = {{0, "Uniform"}, {1, "Station based"}, {2, "Fully distributed"}};
 
 /// A constant or a time series.
 class CGlobalKvf : public CTvnKvfBase {
@@ -116,8 +125,6 @@ class C2DStationBasedDataTimeSeriesKvf : public CFMSEKvfGroupBase {
 
   /// Counted among the stations alone.
   int GetNumberWhatAmI() const override;
-  int IsDlgUsedInSetup() override;
-  int ValidateData() override;
   void ReadData(KvfNode* section) override;
 
  protected:
@@ -131,8 +138,8 @@ class C2DStationBasedDataTimeSeriesKvf : public CFMSEKvfGroupBase {
 /// A forcing.
 class C2DStationBasedDataKvf : public CFMSEKvfBase, public ForcingNode {
  public:
-  /// A forcing of that quantity, or of precipitation depths.
-  C2DStationBasedDataKvf(int itemType, std::string title, std::string section, CYbSEKvfBase* parent);
+  /// The kind of a forcing of that quantity, or of precipitation depths, with the usual pages.
+  static ForcingKind PlainKind(int itemType);
   C2DStationBasedDataKvf(ForcingKind kind, std::string title, std::string section, CYbSEKvfBase* parent);
 
   enum Distribution : int { kUniform = 0, kStationBased = 1, kFullyDistributed = 2 };
@@ -144,7 +151,7 @@ class C2DStationBasedDataKvf : public CFMSEKvfBase, public ForcingNode {
   int GetItemType() const { return kind_.itemTypes.front(); }
   bool HasElevation() const { return !kind_.correctable.empty(); }
   /// Whether the setup corrects the forcing for elevation.
-  virtual bool IsCorrectedForElevation() const { return false; }
+  bool IsCorrectedForElevation() const { return HasElevation() && kind_.correctedWhen.Holds(*this); }
   CGlobalKvf& Global() const { return *global_; }
   CStationBasedKvf& Stations() const { return *stations_; }
   CFullyDistributedKvf& FullyDistributed() const { return *fully_; }
@@ -169,8 +176,8 @@ class C2DStationBasedDataKvf : public CFMSEKvfBase, public ForcingNode {
   std::vector<std::string> GetStationNames() const { return ZoneItemTitles(*this); }
 
   Forcing CurrentForcing() const override;
+  /// By its rule; without one as its parent does.
   int IsDlgUsedInSetup() override;
-  int ValidateData() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
@@ -182,15 +189,6 @@ class C2DStationBasedDataKvf : public CFMSEKvfBase, public ForcingNode {
   CFullyDistributedKvf* fully_;
 };
 
-/// A forcing whose stations have a class of their own.
-template <class Station>
-class ForcingOf : public C2DStationBasedDataKvf {
- public:
-  using C2DStationBasedDataKvf::C2DStationBasedDataKvf;
-
-  std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override { return std::make_shared<Station>(Kind(), this); }
-};
-
 /// A constant or a time series without anything spatial.
 class CTimeseriesConstKvf : public CTvnKvfBase, public ForcingNode {
  public:
@@ -199,7 +197,6 @@ class CTimeseriesConstKvf : public CTvnKvfBase, public ForcingNode {
   int GetItemType() const { return itemType_; }
   CGlobalKvf& Global() const { return *global_; }
   Forcing CurrentForcing() const override;
-  int ValidateData() override;
 
  private:
   int itemType_;

@@ -4,8 +4,9 @@
 
 #include <algorithm>
 
+#include "platform/item_types.h"
 #include "platform/units.h"
-#include "simspec/model_components.h"
+#include "simspec/conditions.h"
 #include "spatial/data2d.h"
 #include "spatial/pages.h"
 
@@ -19,12 +20,13 @@ constexpr int kMostZones = kLargestItemCount;
 
 void CSubcatchmentRiverlinkItemKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Branchname", Branchname);
-  keys("Upstream", Upstream);
-  keys("Downstream", Downstream);
+  keys("Upstream", Upstream).Quantity(quantity::kChainage);
+  keys("Downstream", Downstream).Quantity(quantity::kChainage);
 }
 
-CSubcatchmentRiverlinksListKvf::CSubcatchmentRiverlinksListKvf(const bool* useDefaults, CYbSEKvfBase* parent)
-    : CYbSEKvfListBase("River links", "Riverlinks", parent), useDefaults_(useDefaults) {
+CSubcatchmentRiverlinksListKvf::CSubcatchmentRiverlinksListKvf(const bool& useDefaults, CYbSEKvfBase* parent)
+    : CYbSEKvfListBase("River links", "Riverlinks", parent) {
+  TakesPartWhen(!On(useDefaults));
   SetPage(kRiverLinksPage);
 }
 
@@ -46,19 +48,20 @@ void CodedZoneProp::ReadData(KvfNode* section) {
 
 CodedZonesKvf::CodedZonesKvf(std::string title, std::string section, const char* countKey, CYbSEKvfBase* parent)
     : CFMSEKvfBase(std::move(title), std::move(section), parent),
-      ShapeAxisUnit(BaseUnit(*FindItemType(kCoordinateItemType)).key),
+      ShapeAxisUnit(BaseUnit(*FindItemType(quantity::kMapCoordinate)).key),
       countKey_(countKey),
-      gridFile_(NewChild<CTvnData2DNdsFile>(kCodeItemType)),
+      gridFile_(NewChild<CTvnData2DNdsFile>(quantity::kCode)),
       shapeFile_(NewChild<CData2DShpFile>()) {
-  gridFile_->SetFileUsed(0);
-  shapeFile_->SetValidateFlag(0);
+  const Condition isDistributed = Is(DistributionType, kDistributed);
+  gridFile_->UsedWhen(isDistributed && Is(Type, kGridCodes));
+  shapeFile_->UsedWhen(isDistributed && Is(Type, kPolygons));
   shapeFile_->SetPolygonShape(1);
   shapeFile_->SetAxisUnit(ShapeAxisUnit);
 }
 
 void CodedZonesKvf::ExchangeKeys(KeyExchange& keys) {
-  keys("DistributionType", DistributionType);
-  keys.FromOne("Type", Type);
+  keys("DistributionType", DistributionType).OneOf(kZoneDistributions);
+  keys.FromOne("Type", Type).OneOf(kZoneSources);
   keys("ShapeAxisUnit", ShapeAxisUnit);
   keys("ShapeGapFillName", ShapeGapFillName);
   keys.WriteOnly(countKey_, static_cast<int>(ZoneItems(*this).size()));
@@ -120,17 +123,11 @@ CFMSEKvfGroupBase* CodedZonesKvf::SelectZoneByCode(int code) const {
   return nullptr;
 }
 
-int CodedZonesKvf::ValidateData() {
-  gridFile_->SetFileUsed(UsesGridCodes());
-  shapeFile_->SetValidateFlag(UsesPolygons());
-  return 1;
-}
-
 // ---- Subcatchments
 
 CSubcatchmentPropKvf::CSubcatchmentPropKvf(CYbSEKvfBase* parent)
     : CodedZoneProp("Subcatchment", "Subcatchment", parent) {
-  NewChild<CSubcatchmentRiverlinksListKvf>(&DefaultRiverLinks);
+  NewChild<CSubcatchmentRiverlinksListKvf>(DefaultRiverLinks);
   SetPage(kSubcatchmentPropPage);
 }
 
@@ -142,16 +139,13 @@ void CSubcatchmentPropKvf::ExchangeKeys(KeyExchange& keys) {
 CSubcatchmentKvf::CSubcatchmentKvf(CYbSEKvfBase* parent)
     : CodedZonesKvf("Subcatchments", "Subcatchments", "NO_ZONES", parent) {
   SetPage(kSubcatchmentPage);
+  TakesPartWhen(OwnEngine() &&
+                ((Component(&CModelCompKvf::SZ) && Method(&CModelCompKvf::SZ_ModelType, kLinearReservoir)) ||
+                 (Component(&CModelCompKvf::OL) && Method(&CModelCompKvf::OL_ModelType, kSubcatchmentOverland))));
 }
 
 std::shared_ptr<CFMSEKvfGroupBase> CSubcatchmentKvf::CreateStationItem() {
   return std::make_shared<CSubcatchmentPropKvf>(this);
-}
-
-int CSubcatchmentKvf::IsDlgUsedInSetup() {
-  const CModelCompKvf& components = ModelCompOf(*this);
-  return EngineOf(*this) == kEngineTervane &&
-         ((components.SZ && components.SZ_ModelType == 1) || (components.OL && components.OL_ModelType == 1));
 }
 
 }  // namespace tervane

@@ -32,15 +32,10 @@ class CSubcatchmentRiverlinkItemKvf : public CTvnKvfBase {
 class CSubcatchmentRiverlinksListKvf : public CYbSEKvfListBase<CSubcatchmentRiverlinkItemKvf> {
  public:
   /// `useDefaults` is the owner's flag that says so.
-  CSubcatchmentRiverlinksListKvf(const bool* useDefaults, CYbSEKvfBase* parent);
-
-  int IsDlgUsedInSetup() override { return *useDefaults_ ? 0 : 1; }
+  CSubcatchmentRiverlinksListKvf(const bool& useDefaults, CYbSEKvfBase* parent);
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("Noofreaches", *this); }
-
- private:
-  const bool* useDefaults_;
 };
 
 /// A zone: who it is and how it is called. What else it holds is told by the class.
@@ -63,6 +58,10 @@ class CodedZoneProp : public CFMSEKvfGroupBase {
   /// The keys that every zone begins with.
   void ExchangeKeys(KeyExchange& keys) override;
 };
+
+inline constexpr KeyChoice kZoneDistributions[] = {{0, "Uniform"}, {1, "Distributed"}};
+inline constexpr KeyChoice kZoneSources[] = {{0, "Grid codes (.nds2)"},
+                                             {1, "Polygons (.shp)"}};  ///< One higher in the file.
 
 /// The parent of zones.
 class CodedZonesKvf : public CFMSEKvfBase, public CellValues {
@@ -101,7 +100,6 @@ class CodedZonesKvf : public CFMSEKvfBase, public CellValues {
   CFMSEKvfGroupBase* SelectZoneByName(const std::string& name) const;
   CFMSEKvfGroupBase* SelectZoneByCode(int code) const;
 
-  int ValidateData() override;
   void ReadData(KvfNode* section) override;
   void WriteData(KvfFile* file) override;
 
@@ -131,7 +129,7 @@ class CSubcatchmentKvf : public CodedZonesKvf {
   explicit CSubcatchmentKvf(CYbSEKvfBase* parent);
 
   std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
-  int IsDlgUsedInSetup() override;
 };
+inline constexpr ImportantName<CSubcatchmentKvf> kSubcatchments{"SUBCATCHMENT"};
 
 }  // namespace tervane

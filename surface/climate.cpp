@@ -2,7 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "surface/climate.h"
 
-#include "simspec/model_components.h"
+#include <fmt/format.h>
+
+#include "platform/item_types.h"
+#include "simspec/conditions.h"
 #include "surface/pages.h"
 
 namespace tervane {
@@ -11,178 +14,199 @@ namespace {
 
 constexpr int kLastVersionOfOldNames = 10;
 
-constexpr int kPrecipitationDepth = 100004, kEvapotranspirationDepth = 100005;
-constexpr int kTemperature = 100006;
-
 /// The switches of the node's tree; those of a new setup where the tree holds none.
 const CPrecipitationRelatedKvf& ClimateOf(const CYbSEKvfBase& node) {
   static const CPrecipitationRelatedKvf defaults(nullptr);
-  const auto* climate = node.Important<CPrecipitationRelatedKvf>("PRECIPITATIONRELATED");
+  const auto* climate = node.Important(kClimate);
   return climate ? *climate : defaults;
 }
 
-bool HasSnow(const CYbSEKvfBase& node) { return ClimateOf(node).SM != 0; }
-
-/// Whether processes of water quality of that type are modelled.
-bool HasProcesses(const CYbSEKvfBase& node, int processType) {
-  const auto* quality = node.Important<CModelCompWQKvf>("MODEL_COMP_WQ");
-  return ModelCompOf(node).WQ && quality && quality->IncludeProcesses && quality->ProcessType == processType;
+Condition Switch(int CPrecipitationRelatedKvf::*flag) {
+  return On<CPrecipitationRelatedKvf>([](const CYbSEKvfBase& node) { return &ClimateOf(node); }, flag);
 }
 
-bool IsAnyDecayTemperatureDependent(const CYbSEKvfBase& node) {
-  const auto* decays = node.Important<DecayProcessList>("DECAY_LIST");
-  return HasProcesses(node, 0) && decays && decays->IsAnyTemperatureDependent();
+Condition HasSnow() { return Switch(&CPrecipitationRelatedKvf::SM); }
+
+Condition IsTakenByTemplates(const char* input, int code) {
+  return WaterQualityProcesses(kKinetra) &&
+         Condition::Sentence(fmt::format("a process template takes the {}", input), [code](const CYbSEKvfBase& node) {
+           const auto* templates = node.Important(kProcessTemplates);
+           return templates && templates->IsBuiltInUsed(code);
+         });
 }
 
-bool IsTakenByTemplates(const CYbSEKvfBase& node, int code) {
-  const auto* templates = node.Important<ProcessTemplates>("KINETRASPEC");
-  return HasProcesses(node, 1) && templates && templates->IsBuiltInUsed(code);
+Condition IsAnyDecayTemperatureDependent() {
+  return WaterQualityProcesses(kSorptionAndDecay) &&
+         Condition::Sentence("a decay process depends on temperature", [](const CYbSEKvfBase& node) {
+           const auto* decays = node.Important(kDecayProcesses);
+           return decays && decays->IsAnyTemperatureDependent();
+         });
 }
-
-}  // namespace
 
 // ---- Forcings
 
-CPrecipitationKvf::CPrecipitationKvf(CYbSEKvfBase* parent)
-    : ForcingOf({.itemTypes = {100431, kPrecipitationDepth},
-                 .valueTypes = kMeansOrSums,
-                 .stationTitle = "Station Data - Precipitation Rate",
-                 .correctable = "precipitation",
-                 .page = &kPrecipitationPage,
-                 .stationPage = &kPrecipitationStationPage},
-                "Precipitation Rate", "PrecipitationRate", parent) {}
-
-bool CPrecipitationKvf::IsCorrectedForElevation() const { return ClimateOf(*this).CorrectPrecipitation != 0; }
-
-CPotEvapTransKvf::CPotEvapTransKvf(CYbSEKvfBase* parent)
-    : ForcingOf({.itemTypes = {100387, kEvapotranspirationDepth},
-                 .valueTypes = kMeansOrSums,
-                 .stationTitle = "Station Data - Potential EvapoTranspiration",
-                 .page = &kPotEvapTransPage,
-                 .stationPage = &kPotEvapTransStationPage},
-                "Reference Evapotranspiration", "POTEVAPTRANS", parent) {}
-
-int CPotEvapTransKvf::IsDlgUsedInSetup() { return EngineOf(*this) == kEngineTervane && ModelCompOf(*this).ET; }
-
-CSnowmeltKvf::CSnowmeltKvf(int itemType, CYbSEKvfBase* parent)
-    : ForcingOf({.itemTypes = {itemType},
-                 .valueTypes = {},
-                 .stationTitle = "Station Data - Air Temperature",
-                 .correctable = "air temperature",
-                 .page = &kAirTemperaturePage,
-                 .stationPage = &kAirTemperatureStationPage},
-                "Air Temperature", "AirTemperature", parent) {}
-
-bool CSnowmeltKvf::IsCorrectedForElevation() const { return ClimateOf(*this).CorrectAirTemperature != 0; }
-
-int CSnowmeltKvf::IsDlgUsedInSetup() {
-  return EngineOf(*this) == kEngineTervane && (HasSnow(*this) || IsAnyDecayTemperatureDependent(*this) ||
-                                               IsTakenByTemplates(*this, ProcessTemplates::kAirTemperature));
+ForcingKind Precipitation() {
+  return {.className = "CPrecipitationKvf",
+          .stationClassName = "CPrecTimeSeriesKvf",
+          .itemTypes = {quantity::kPrecipitationRate, quantity::kRainfall},
+          .valueTypes = kMeansOrSums,
+          .stationTitle = "Station Data - Precipitation Rate",
+          .correctable = "precipitation",
+          .correctedWhen = Switch(&CPrecipitationRelatedKvf::CorrectPrecipitation),
+          .page = &kPrecipitationPage,
+          .stationPage = &kPrecipitationStationPage};
 }
 
-void CSnowmeltKvf::Load(KvfNode* parentSection) { LoadRenamed(kLastVersionOfOldNames, "SNOWMELT", parentSection); }
-
-CSwSolarRadiation::CSwSolarRadiation(CYbSEKvfBase* parent)
-    : C2DStationBasedDataKvf(100203, "Short Wave Solar Radiation", "SWSolarRadiation", parent) {
-  SetAbbreviatedTitle("SW Solar Radiation");
+ForcingKind ReferenceEvapotranspiration() {
+  return {.className = "CPotEvapTransKvf",
+          .stationClassName = "CPotEvapTransTimeSeriesKvf",
+          .itemTypes = {quantity::kEvapotranspirationRate, quantity::kEvapotranspirationDepth},
+          .valueTypes = kMeansOrSums,
+          .stationTitle = "Station Data - Potential EvapoTranspiration",
+          .page = &kPotEvapTransPage,
+          .stationPage = &kPotEvapTransStationPage};
 }
 
-int CSwSolarRadiation::IsDlgUsedInSetup() {
-  return ClimateOf(*this).IncludeSolarRadiation || IsTakenByTemplates(*this, ProcessTemplates::kSolarRadiation);
+ForcingKind AirTemperature() {
+  return {.className = "CSnowmeltKvf",
+          .stationClassName = "CSnowmeltTimeSeriesKvf",
+          .itemTypes = {quantity::kTemperature},
+          .valueTypes = {},
+          .stationTitle = "Station Data - Air Temperature",
+          .correctable = "air temperature",
+          .correctedWhen = Switch(&CPrecipitationRelatedKvf::CorrectAirTemperature),
+          .page = &kAirTemperaturePage,
+          .stationPage = &kAirTemperatureStationPage};
 }
 
-// ---- Lapse rates
-
-CPrecipitationLapseRateKvf::CPrecipitationLapseRateKvf(CYbSEKvfBase* parent)
-    : CData2DKvf({"PrecipLapseRate", "Precipitation Correction Lapse Rate", 100190}, parent) {
-  SetAbbreviatedTitle("Precipitation Lapse Rate");
+ForcingKind SolarRadiation() {
+  ForcingKind kind = C2DStationBasedDataKvf::PlainKind(quantity::kRadiationAndHeatFlux);
+  kind.className = "CSwSolarRadiation";
+  kind.shortTitle = "SW Solar Radiation";
+  return kind;
 }
 
-int CPrecipitationLapseRateKvf::IsDlgUsedInSetup() { return ClimateOf(*this).CorrectPrecipitation; }
-
-CTemperatureLapseRateKvf::CTemperatureLapseRateKvf(CYbSEKvfBase* parent)
-    : CData2DKvf({"TempLapseRate", "Temperature Correction Lapse Rate", 100189, -0.649F}, parent) {
-  SetAbbreviatedTitle("Temperature Lapse Rate");
+ForcingKind DegreeDayCoefficient() {
+  ForcingKind kind = C2DStationBasedDataKvf::PlainKind(quantity::kDegreeDayCoefficient);
+  kind.className = "CDegreeDayFactor";
+  kind.shortTitle = "Degree-day coefficient";
+  return kind;
 }
 
-int CTemperatureLapseRateKvf::IsDlgUsedInSetup() { return ClimateOf(*this).CorrectAirTemperature; }
+// ---- Over the model area
 
-CWetLapseRateKvf::CWetLapseRateKvf(CYbSEKvfBase* parent)
-    : CData2DKvf({"WetLapseRate", "Temperature Correction Lapse Rate When Raining", 100189, -0.3F}, parent) {
-  SetAbbreviatedTitle("Wet Lapse Rate");
-}
+const Data2DKind kPrecipitationLapseRate{.className = "CPrecipitationLapseRateKvf",
+                                         .section = "PrecipLapseRate",
+                                         .title = "Precipitation Correction Lapse Rate",
+                                         .itemType = quantity::kPrecipitationLapseRate,
+                                         .shortTitle = "Precipitation Lapse Rate"};
+const Data2DKind kTemperatureLapseRate{.className = "CTemperatureLapseRateKvf",
+                                       .section = "TempLapseRate",
+                                       .title = "Temperature Correction Lapse Rate",
+                                       .itemType = quantity::kTemperatureLapseRate,
+                                       .fixedValue = -0.649F,
+                                       .shortTitle = "Temperature Lapse Rate"};
+const Data2DKind kWetLapseRate{.className = "CWetLapseRateKvf",
+                               .section = "WetLapseRate",
+                               .title = "Temperature Correction Lapse Rate When Raining",
+                               .itemType = quantity::kTemperatureLapseRate,
+                               .fixedValue = -0.3F,
+                               .shortTitle = "Wet Lapse Rate"};
 
-int CWetLapseRateKvf::IsDlgUsedInSetup() {
-  const CPrecipitationRelatedKvf& climate = ClimateOf(*this);
-  return climate.UseWetDryLapseRate && climate.CorrectAirTemperature;
-}
+const Data2DKind kThresholdTemperature{.className = "CThreshMeltTempKvf",
+                                       .section = "ThreshMeltTemp",
+                                       .title = "Threshold Melting Temperature",
+                                       .itemType = quantity::kTemperature,
+                                       .shortTitle = "Melting temperature"};
+const Data2DKind kRadiationMelting{.className = "CRadMeltingCoeffKvf",
+                                   .section = "RadMeltingCoeff",
+                                   .title = "Melting Coefficient for Adsorption of Solar Radiation",
+                                   .itemType = quantity::kRadiationMeltCoefficient,
+                                   .shortTitle = "Radiation melting Coeff"};
+const Data2DKind kSnowCover[] = {{.className = "CMinSnowStorageKvf",
+                                  .section = "MinSnowStorage",
+                                  .title = "Minimum Snow Storage for Full Area Coverage",
+                                  .itemType = quantity::kStorageDepth,
+                                  .shortTitle = "Min snow storage"},
+                                 {.className = "CMaxWetSnowFracKvf",
+                                  .section = "MaxWetSnowFrac",
+                                  .title = "Maximum Wet Snow Fraction in Snow Storage",
+                                  .itemType = quantity::kFraction,
+                                  .shortTitle = "Max Wet Snow Fraction"},
+                                 {.className = "CInitialTotalSnowStorageKvf",
+                                  .section = "InitialSnowStorage",
+                                  .title = "Initial Total Snow Storage",
+                                  .itemType = quantity::kStorageDepth,
+                                  .shortTitle = "Initial Total Snow Storage"},
+                                 {.className = "CInitialWetSnowFractionKvf",
+                                  .section = "InitialWetSnowFrac",
+                                  .title = "Initial Wet Snow Fraction",
+                                  .itemType = quantity::kFraction,
+                                  .shortTitle = "Initial Wet Snow Fraction"}};
+
+constexpr KeyChoice kRechargeOptions[] = {
+    {CPrecipitationRelatedKvf::kHighestActiveCell,
+     "Apply recharge to the highest active cell in each vertical profile"},
+    {CPrecipitationRelatedKvf::kTopLayer, "Apply recharge to the top layer only"},
+    {CPrecipitationRelatedKvf::kGivenLayer, "Apply recharge to a specific layer"}};
+constexpr KeyChoice kPondingOptions[] = {
+    {CPrecipitationRelatedKvf::kAsConfined, "Apply recharge as in the confined case"},
+    {CPrecipitationRelatedKvf::kUpToPondingElevation, "Apply recharge untill ponding elevation is reached"}};
+
+}  // namespace
 
 // ---- Snow
 
-SnowData2D::SnowData2D(Data2DKind kind, std::string abbreviatedTitle, CYbSEKvfBase* parent)
-    : CData2DKvf(std::move(kind), parent) {
-  SetAbbreviatedTitle(std::move(abbreviatedTitle));
-}
-
-int SnowData2D::IsDlgUsedInSetup() { return HasSnow(*this); }
-
-int CRadMeltingCoeffKvf::IsDlgUsedInSetup() { return HasSnow(*this) && ClimateOf(*this).IncludeSolarRadiation; }
-
-CDegreeDayFactor::CDegreeDayFactor(CYbSEKvfBase* parent)
-    : C2DStationBasedDataKvf(100178, "Degree-day Melting or Freezing Coefficient", "DegreeDayFactor", parent) {
-  SetAbbreviatedTitle("Degree-day coefficient");
-  Global().FIXED_VALUE = 2;
-}
-
-int CDegreeDayFactor::IsDlgUsedInSetup() { return HasSnow(*this); }
-
 CSnowmeltConstKvf::CSnowmeltConstKvf(CYbSEKvfBase* parent)
     : CYbSEKvfBase("Snow Melt", "SNOWMELTCONST", parent),
-      threshold_(NewChild<CThreshMeltTempKvf>()),
-      degreeDayFactor_(NewChild<CDegreeDayFactor>()) {
+      threshold_(NewImportantChild<CData2DKvf>(kMeltingTemperature, kThresholdTemperature, HasSnow())),
+      degreeDayCoefficient_(NewImportantChild<C2DStationBasedDataKvf>(kDegreeDayCoefficient, DegreeDayCoefficient(),
+                                                                      "Degree-day Melting or Freezing Coefficient",
+                                                                      "DegreeDayFactor")) {
   SetPage(kSnowMeltPage);
-  NewChild<CRadMeltingCoeffKvf>();
-  NewChild<CMinSnowStorageKvf>();
-  NewChild<CMaxWetSnowFracKvf>();
-  NewChild<CInitialTotalSnowStorageKvf>();
-  NewChild<CInitialWetSnowFractionKvf>();
-  if (!GetRoot()) return;
-  GetRoot()->RegisterImportantNode(threshold_, "THRESHMELTTEMP");
-  GetRoot()->RegisterImportantNode(degreeDayFactor_, "DegreeDayFactor");
+  TakesPartWhen(OwnEngine() && HasSnow());
+  degreeDayCoefficient_->Global().FIXED_VALUE = 2;
+  degreeDayCoefficient_->TakesPartWhen(HasSnow());
+  NewChild<CData2DKvf>(kRadiationMelting, HasSnow() && Switch(&CPrecipitationRelatedKvf::IncludeSolarRadiation));
+  for (const Data2DKind& kind : kSnowCover) NewChild<CData2DKvf>(kind, HasSnow());
 }
-
-int CSnowmeltConstKvf::IsDlgUsedInSetup() { return EngineOf(*this) == kEngineTervane && HasSnow(*this); }
 
 void CSnowmeltConstKvf::ExchangeKeys(KeyExchange& keys) {
   keys("ThermalMelt", ThermalMelt);
-  keys("MeltCoefficient", MeltCoefficient);
-  keys("SublimationRate", SublimationRate);
+  keys("MeltCoefficient", MeltCoefficient).Quantity(quantity::kRainHeatMeltCoefficient);
+  keys("SublimationRate", SublimationRate).Quantity(quantity::kFactor);
   // One number each, for the whole area and all times, until both got nodes of their own.
   keys.Until(kLastVersionOfOldNames, "Threshold", threshold_->FixedValue);
-  keys.Until(kLastVersionOfOldNames, "DegreeDayFactor", degreeDayFactor_->Global().FIXED_VALUE);
+  keys.Until(kLastVersionOfOldNames, "DegreeDayFactor", degreeDayCoefficient_->Global().FIXED_VALUE);
 }
 
 // ---- The whole
 
 CPrecipitationRelatedKvf::CPrecipitationRelatedKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Climate", "Climate", parent) {
+  using Climate = CPrecipitationRelatedKvf;
   SetPage(kClimatePage);
-  const auto registered = [this](CYbSEKvfBase* child, std::string_view name) {
-    if (GetRoot()) GetRoot()->RegisterImportantNode(child, name);
+  SetOldSectionName(kLastVersionOfOldNames, "Precipitation");
+  TakesPartWhen(OwnEngine() || ModflowMethod(&CModModelCompKvf::Recharge, 1));
+  const auto forcing = [this](ImportantName<C2DStationBasedDataKvf> name, ForcingKind kind, const char* title,
+                              const char* section) {
+    return NewImportantChild<C2DStationBasedDataKvf>(name, std::move(kind), title, section);
   };
-  registered(NewChild<CPrecipitationKvf>(), "PRECIPITATION");
-  NewChild<CPrecipitationLapseRateKvf>();
-  registered(NewChild<CPotEvapTransKvf>(), "POTEVAPTRANS");
-  registered(NewChild<CSwSolarRadiation>(), "SW Solar Radiation");
-  registered(NewChild<CSnowmeltKvf>(kTemperature), "AIR TEMPERATURE");
-  NewChild<CTemperatureLapseRateKvf>();
-  NewChild<CWetLapseRateKvf>();
-  registered(NewChild<CSnowmeltConstKvf>(), "SNOW MELT CONST");
-  NewChild<CDummyEvapoTransKvf>();
-  NewChild<CDummyUnSatZoneKvf>();
-}
-
-int CPrecipitationRelatedKvf::IsDlgUsedInSetup() {
-  return EngineOf(*this) == kEngineTervane || ModModelCompOf(*this).Recharge == 1;
+  forcing(kPrecipitation, Precipitation(), "Precipitation Rate", "PrecipitationRate");
+  NewChild<CData2DKvf>(kPrecipitationLapseRate, Switch(&Climate::CorrectPrecipitation));
+  forcing(kReferenceEvapotranspiration, ReferenceEvapotranspiration(), "Reference Evapotranspiration", "POTEVAPTRANS")
+      ->TakesPartWhen(OwnEngine() && Component(&CModelCompKvf::ET));
+  forcing(kSolarRadiation, SolarRadiation(), "Short Wave Solar Radiation", "SWSolarRadiation")
+      ->TakesPartWhen(Switch(&Climate::IncludeSolarRadiation) ||
+                      IsTakenByTemplates("solar radiation", ProcessTemplates::kSolarRadiation));
+  auto* temperature = forcing(kAirTemperature, AirTemperature(), "Air Temperature", "AirTemperature");
+  temperature->SetOldSectionName(kLastVersionOfOldNames, "SNOWMELT");
+  temperature->TakesPartWhen(OwnEngine() && (HasSnow() || IsAnyDecayTemperatureDependent() ||
+                                             IsTakenByTemplates("air temperature", ProcessTemplates::kAirTemperature)));
+  NewChild<CData2DKvf>(kTemperatureLapseRate, Switch(&Climate::CorrectAirTemperature));
+  NewChild<CData2DKvf>(kWetLapseRate, Switch(&Climate::UseWetDryLapseRate) && Switch(&Climate::CorrectAirTemperature));
+  NewImportantChild<CSnowmeltConstKvf>(kSnowMelt);
+  NewNetRainfallFraction(*this);
+  NewInfiltrationFraction(*this);
 }
 
 int CPrecipitationRelatedKvf::ValidateData() {
@@ -191,23 +215,19 @@ int CPrecipitationRelatedKvf::ValidateData() {
   return 0;
 }
 
-void CPrecipitationRelatedKvf::Load(KvfNode* parentSection) {
-  LoadRenamed(kLastVersionOfOldNames, "Precipitation", parentSection);
-}
-
 void CPrecipitationRelatedKvf::ExchangeKeys(KeyExchange& keys) {
   keys("SM", SM);
   keys("CorrectPrecipitation", CorrectPrecipitation);
   keys("CorrectAirTemperature", CorrectAirTemperature);
   keys("UseWetDryLapseRate", UseWetDryLapseRate);
   keys("IncludeSolarRadiation", IncludeSolarRadiation);
-  keys("RechargeOption", RechargeOption);
-  keys("PondingOption", PondingOption);
+  keys("RechargeOption", RechargeOption).OneOf(kRechargeOptions);
+  keys("PondingOption", PondingOption).OneOf(kPondingOptions);
 }
 
 void CEvapotransKvf::ReadData(KvfNode* section) {
   CTvnKvfBase::ReadData(section);
-  if (auto* evapotranspiration = Important<CPotEvapTransKvf>("POTEVAPTRANS")) evapotranspiration->Load(section);
+  if (auto* evapotranspiration = Important(kReferenceEvapotranspiration)) evapotranspiration->Load(section);
 }
 
 }  // namespace tervane

@@ -7,12 +7,16 @@
 #include "core/kvf.h"
 #include "data/grid_files.h"
 #include "execution/processed_pages.h"
+#include "overlays/pages.h"
+#include "pages/document/coverage_page.h"
 #include "pages/document/help_pages.h"
 #include "pages/parts/plot_content.h"
 #include "platform/files.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "platform/units.h"
+#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -101,15 +105,15 @@ void COverviewDlg::Describe(PageForm& form) {
 }
 
 void CDisplayDlg::SetData() {
-  if (const auto* domain = Node().Important<CCatchmentKvf>("CATCHMENT")) Node().AdoptDomain(domain->GetEnvelope());
+  if (const auto* domain = Node().Important(kDomain)) Node().AdoptDomain(domain->GetEnvelope());
 }
 
 void CDisplayDlg::Describe(PageForm& form) {
   COverlaysKvf& n = Node();
-  const auto isFree = [&n] { return n.UseModelDomain == 0; };
+  const Condition isFree = !On(n.UseModelDomain);
   form.Check("Default map display based on the Model Domain", n.UseModelDomain);
   const auto corner = [&](PageForm& group, const char* label, double& value) {
-    group.Number(label, value).Quantity(kCoordinateItemType).EnabledWhen(isFree).Then([&n] {
+    group.Number(label, value).Quantity(quantity::kMapCoordinate).EnabledWhen(isFree).Then([&n] {
       n.SetArea({n.x0, n.y0, n.x1, n.y1});
       return 0;
     });
@@ -122,7 +126,7 @@ void CDisplayDlg::Describe(PageForm& form) {
   corner(upper, "Y", n.y1);
   form.Button("Import...", [this] { Import(); }).EnabledWhen(isFree);
   form.Map([&n] {
-    const auto* domain = n.Important<CCatchmentKvf>("CATCHMENT");
+    const auto* domain = n.Important(kDomain);
     if (!domain) return MapContent();
     MapContent map = domain->Type == CCatchmentKvf::kGridFile
                          ? FileMap(domain->GridFile())
@@ -159,7 +163,7 @@ void CDisplayDlg::Import() {
     axis.title = "Shape axis units";
     axis.file = *path;
     axis.heads = {"Unit of the coordinates"};
-    const auto units = FindItemType(kCoordinateItemType)->unitKeys;
+    const auto units = FindItemType(quantity::kMapCoordinate)->unitKeys;
     for (const int unit : units) axis.rows.push_back({{std::string(FindUnit(unit)->text)}, {}});
     axis.current = 0;
     const auto chosen = Outside().AskItem(axis);
@@ -176,5 +180,18 @@ void CDisplayDlg::Import() {
   Node().SetArea(*area);
   UpdateDoc(kDataChanged, "Import Area");
 }
+
+namespace {
+
+constexpr PageRow kPages[] = {
+    PageIs<CTvnHelpView, CYbSEKvfBase>(kHelpPage),
+    PageIs<COverviewDlg, COverviewKvf>(kOverviewPage),
+    PageIs<CCoverageDlg, CCoverageKvf>(kCoveragePage),
+    PageIs<CDisplayDlg, COverlaysKvf>(kDisplayPage),
+};
+
+}  // namespace
+
+std::span<const PageRow> DocumentPages() { return kPages; }
 
 }  // namespace tervane

@@ -2,8 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <span>
+
 #include "document/overview.h"
-#include "forms/page.h"
+#include "forms/page_rows.h"
 #include "overlays/overlays.h"
 
 namespace tervane {
@@ -53,5 +55,8 @@ class CDisplayDlg : public PageOf<COverlaysKvf> {
   /// Takes the corners from a grid, an image's place or a shape file.
   void Import();
 };
+
+/// The pages of the document as a whole: help, overview, coverage, display.
+std::span<const PageRow> DocumentPages();
 
 }  // namespace tervane

@@ -10,7 +10,9 @@
 
 #include "data/datafile.h"
 #include "document/flow_model_document.h"
+#include "execution/pages.h"
 #include "pages/parts/plot_content.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 
@@ -155,7 +157,7 @@ void CPreprocessedNDS3_PLOTDlg::Describe(PageForm& form) {
               names.push_back(fmt::format("Computational Layer {}", layer));
             return names;
           })
-      .EnabledWhen([this] { return !HasFixedLayer(); })
+      .EnabledWhen("the report leaves the layer open", [this] { return !HasFixedLayer(); })
       .Hint(kViewOnly);
   form.Button("Edit...", [this] { EditDataFile(Context(), Node(), FileName(Node().GetFile(), {}), Item()); })
       .ToolTip("Use grid editor to view preprocessed grid data");
@@ -210,10 +212,28 @@ void CPreprocessedSHAPE_PLOTDlg::Describe(PageForm& form) {
     CData2DShpFile file(nullptr);
     file.File = FileName(Node().GetFile(), {});
     const int unit = Node().GetNumber("enuAxisUnit");
-    MapContent map = ShapeFileMap(file, unit ? unit : BaseUnit(*FindItemType(kCoordinateItemType)).key);
+    MapContent map = ShapeFileMap(file, unit ? unit : BaseUnit(*FindItemType(quantity::kMapCoordinate)).key);
     if (file.File.IsEmpty()) map.message = kNoFile;
     return map;
   });
 }
+
+namespace {
+
+constexpr PageRow kPages[] = {
+    PageIs<CProcDataDlg, CProcDataKvf>(kProcDataPage),
+    PageIs<CPreprocessedBlankDlg, CPreprocessedDataEntity>(kPreprocessedBlankPage),
+    PageIs<CPreprocessedNDS0_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedNds0Page),
+    PageIs<CPreProcessedNDS1_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedNds1Page),
+    PageIs<CPreprocessedNDS2_PLOT, CPreprocessedDataEntity>(kPreprocessedNds2Page),
+    PageIs<CPreprocessedNDS3_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedNds3Page),
+    PageIs<CPreprocessedTextDlg, CPreprocessedDataEntity>(kPreprocessedTextPage),
+    PageIs<CPreprocessedTXTFILEDlg, CPreprocessedDataEntity>(kPreprocessedTextFilePage),
+    PageIs<CPreprocessedSHAPE_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedShapePage),
+};
+
+}  // namespace
+
+std::span<const PageRow> ProcessedPages() { return kPages; }
 
 }  // namespace tervane

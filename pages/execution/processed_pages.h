@@ -6,12 +6,13 @@
 #pragma once
 
 #include <memory>
+#include <span>
 #include <string>
 
 #include "execution/processed_data.h"
 #include "execution/processed_pages.h"
 #include "execution/processed_river.h"
-#include "forms/page.h"
+#include "forms/page_rows.h"
 #include "forms/plots.h"
 
 namespace tervane {
@@ -152,5 +153,8 @@ class CPreprocessedSHAPE_PLOTDlg : public PreprocessedFilePage {
  protected:
   void Describe(PageForm& form) override;
 };
+
+/// The pages of what the preprocessor left.
+std::span<const PageRow> ProcessedPages();
 
 }  // namespace tervane

@@ -9,6 +9,7 @@
 #include "data/series_csv.h"
 #include "data/series_file.h"
 #include "pages/parts/plot_content.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "platform/units.h"
@@ -19,7 +20,6 @@ namespace tervane {
 
 namespace {
 
-constexpr int kHorizontalLength = 100217;
 constexpr const char* kTextFilter = "Text Files (*.txt) |*.txt|All Files (*.*) |*.*||";
 
 /// A new file in the setup's folder, named after what it is for.
@@ -103,7 +103,7 @@ CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, const CYbSE
       fixedValue_(value),
       deleteValue_(deleteValue),
       gridFile_(NewFile(context, node.GetTitle(), "nds2")) {
-  if (const auto* domain = node.Important<CCatchmentKvf>("CATCHMENT")) geometry_ = domain->GetModelGeometry();
+  if (const auto* domain = node.Important(kDomain)) geometry_ = domain->GetModelGeometry();
 }
 
 CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, float value, const CYbSEKvfBase& node,
@@ -111,7 +111,7 @@ CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, float value
     : CData2DNdsCreateDlg(context, node, value, kUsualDeleteValue, itemType, false) {}
 
 CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, const CYbSEKvfBase& node)
-    : CData2DNdsCreateDlg(context, node, -1.0F, -1.0F, kCodeItemType, true) {}
+    : CData2DNdsCreateDlg(context, node, -1.0F, -1.0F, quantity::kCode, true) {}
 
 std::optional<FileName> CData2DNdsCreateDlg::Run() {
   if (!MayCreateFile(Context())) return std::nullopt;
@@ -119,8 +119,7 @@ std::optional<FileName> CData2DNdsCreateDlg::Run() {
 }
 
 void CData2DNdsCreateDlg::Describe(PageForm& form) {
-  const auto isFixed = [this] { return contents_ == kFixedValue; };
-  const auto isText = [this] { return contents_ == kTextFile; };
+  const Condition isFixed = Is(contents_, kFixedValue), isText = Is(contents_, kTextFile);
   form.Radio("", contents_, {isDomain_ ? "1: Inner points, 2: Outer points" : "Fixed value", "Import from text file"});
   if (!isDomain_) form.Number("Fixed Value:", fixedValue_).Quantity(itemType_).EnabledWhen(isFixed);
   Control& text = form.File("Filename:", textFile_);
@@ -132,9 +131,9 @@ void CData2DNdsCreateDlg::Describe(PageForm& form) {
   PageForm& grid = form.Group("Grid");
   grid.Integer("NX:", geometry_.nx).EnabledWhen(isFixed);
   grid.Integer("NY:", geometry_.ny).EnabledWhen(isFixed);
-  grid.Number("Cell size:", geometry_.cellSize).Quantity(kHorizontalLength);
-  grid.Number("X0:", geometry_.x0).Quantity(kHorizontalLength);
-  grid.Number("Y0:", geometry_.y0).Quantity(kHorizontalLength);
+  grid.Number("Cell size:", geometry_.cellSize).Quantity(quantity::kHorizontalLength);
+  grid.Number("X0:", geometry_.x0).Quantity(quantity::kHorizontalLength);
+  grid.Number("Y0:", geometry_.y0).Quantity(quantity::kHorizontalLength);
   grid.Number("Rotation:", geometry_.rotation).Unit("[Deg, Counter clockwise]");
   grid.Text("Map Projection Type:", geometry_.projection);
   Control& file = form.File("Nds filename:", gridFile_);
@@ -165,7 +164,7 @@ std::string CData2DNdsCreateDlg::ImportText() {
 
 std::function<std::string(CTvn2DOrthoRotatedGridData&)> CData2DNdsCreateDlg::GridMaker() const {
   const ItemType* type = FindItemType(itemType_);
-  const int unit = type && itemType_ != kUndefinedItemType ? BaseUnit(*type).key : 0;
+  const int unit = type && itemType_ != quantity::kUndefined ? BaseUnit(*type).key : 0;
   return [geometry = geometry_, value = fixedValue_, deleteValue = deleteValue_, unit, itemType = itemType_,
           isDomain = isDomain_](CTvn2DOrthoRotatedGridData& grid) {
     if (!isDomain) return grid.SetGridData(geometry, value, deleteValue, unit, itemType);
@@ -227,7 +226,7 @@ CTvnCreate0DNdsDlg::CTvnCreate0DNdsDlg(const PageContext& context, const CYbSEKv
       valueTypes_(valueTypes.empty() ? std::vector{0, 1, 2, 3} : std::move(valueTypes)),
       value_(static_cast<double>(value)),
       file_(NewFile(context, node.GetTitle(), "nds0")) {
-  if (const auto* period = node.Important<CSimPeriodKvf>("SIMPERIOD")) {
+  if (const auto* period = node.Important(kSimulationPeriod)) {
     start_ = period->GetSimStartDate();
     end_ = period->SIMEND;
   }
@@ -246,16 +245,17 @@ void CTvnCreate0DNdsDlg::Describe(PageForm& form) {
   }
   constexpr const char* kKinds[] = {"Instantaneous", "Accumulated", "Accumulated over the step", "Mean over the step"};
   for (const int kind : valueTypes_) kinds.emplace_back(kKinds[kind]);
-  const auto isOneValue = [this] { return Trimmed(rows_).empty(); };
+  const Condition isOneValue = Sentence("no rows are pasted", [this] { return Trimmed(rows_).empty(); });
   form.Choice("Quantity:", itemType_, std::move(quantities));
   form.Choice("Kind of value:", valueType_, std::move(kinds));
   form.Date("Start Date:", start_).EnabledWhen(isOneValue);
   form.Date("End Date:", end_).EnabledWhen(isOneValue);
   form.Number("Time step:", stepHours_).Unit("hours").EnabledWhen(isOneValue);
   for (std::size_t i = 0; i < itemTypes_.size(); ++i)
-    form.Number("Value:", value_).Quantity(itemTypes_[i]).EnabledWhen(isOneValue).ShownWhen([this, i] {
-      return itemType_ == static_cast<int>(i);
-    });
+    form.Number("Value:", value_)
+        .Quantity(itemTypes_[i])
+        .EnabledWhen(isOneValue)
+        .ShownWhen(Is(itemType_, static_cast<int>(i)));
   form.LongText("Or dates and values, a row each, as pasted from a spreadsheet:", rows_);
   Control& file = form.File("Nds filename:", file_);
   file.Filter(kSeriesFileFilter).DefaultExtension("nds0");

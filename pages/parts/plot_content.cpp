@@ -12,6 +12,7 @@
 
 #include "overlays/grid_state.h"
 #include "overlays/overlays.h"
+#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "simspec/periods.h"
 
@@ -123,7 +124,7 @@ std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item
   });
 }
 
-const COverlaysKvf* OverlaysOf(const CYbSEKvfBase& node) { return node.Important<COverlaysKvf>("OVERLAY_DATA"); }
+const COverlaysKvf* OverlaysOf(const CYbSEKvfBase& node) { return node.Important(kOverlays); }
 
 /// Grids and shapes of a list of layers that are shown.
 void AddLayers(const COverlayListKvf& list, MapContent& map) {
@@ -155,7 +156,7 @@ MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRo
   const COverlaysKvf* overlays = OverlaysOf(node);
   if (overlays) AddLayers(overlays->Background(), map);
   GridLayer layer;
-  layer.isCodes = grid->ItemType() == kCodeItemType;
+  layer.isCodes = grid->ItemType() == quantity::kCode;
   layer.grid = std::move(grid);
   if (!map.grids.empty() && overlays) layer.transparency = static_cast<double>(overlays->CurrentTransparency());
   // The data come first for what a user points at, whatever lies below them.
@@ -201,7 +202,7 @@ SeriesContent FileChart(const DataFileNode& node) {
     chart.message = "No file is chosen.";
     return chart;
   }
-  if (const auto* period = node.Important<CSimPeriodKvf>("SIMPERIOD"))
+  if (const auto* period = node.Important(kSimulationPeriod))
     chart.period = {period->GetSimStartDate(), period->SIMEND};
   const auto series = RecentSeries(node.File.Absolute(), node.SelectedItem());
   if (const auto data = NowOrAwaited(series, chart.awaited))

@@ -4,14 +4,44 @@
 
 #include "forms/table_form.h"
 #include "platform/text.h"
+#include "simspec/extra_params.h"
+#include "simspec/periods.h"
+#include "simspec/titles.h"
 
 namespace tervane {
 
-void CSimTitleDlg::Describe(PageForm& form) {
-  CSimTitleBase& n = Node();
+namespace {
+
+void DescribeTitle(PageForm& form, CSimTitleBase& n) {
   form.Text("Simulation Title:", n.Title);
   form.LongText("Simulation Description:", n.Description);
 }
+
+/// The simulation period and its hot start.
+class CSimPeriodDlg : public PageOf<CSimPeriodKvf> {
+ public:
+  using PageOf::PageOf;
+  void Initialize() override;
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  void LoadHotStartDates();
+  void ChooseHotStartDate(int index);
+  /// The start comes from the hot start.
+  bool StartsHot() const;
+};
+
+/// The period of a simulation on flow results: water quality or particle tracking.
+class CSimPeriodOnFlowDlg : public PageOf<CSimPeriodOnFlowBase> {
+ public:
+  using PageOf::PageOf;
+  void Initialize() override;
+
+ protected:
+  void Describe(PageForm& form) override;
+};
 
 // ---- Simulation period
 
@@ -39,7 +69,7 @@ bool CSimPeriodDlg::StartsHot() const {
 
 void CSimPeriodDlg::Describe(PageForm& form) {
   CSimPeriodKvf& n = Node();
-  const auto isHot = [&n] { return n.HotStart != 0; };
+  const Condition isHot = On(n.HotStart);
   // The dates on offer follow the file.
   const auto thenLoad = [this](Control& control) -> Control& {
     control.enter = [this, enter = std::move(control.enter)](const std::string& typed) {
@@ -54,9 +84,9 @@ void CSimPeriodDlg::Describe(PageForm& form) {
   form.Date(
           "Start Date:", [&n] { return n.GetSimStartDate(); }, [&n](const CYbDateTime& date) { n.SIMSTART = date; })
       .Key("SIMSTART")
-      .EnabledWhen([this] { return !StartsHot(); })
+      .EnabledWhen("the start is not taken from the hot start", [this] { return !StartsHot(); })
       .RevalidatesLater();
-  form.Date("End Date:", n.SIMEND).Key("SIMEND").RevalidatesLater();
+  form.Date("End Date:", n.SIMEND).RevalidatesLater();
   PageForm& hot = form.Group("Hot start");
   thenLoad(hot.Check("Use hot start data", n.HotStart));
   thenLoad(hot.File("Hot start result File:", n.HotStartResultFile))
@@ -70,7 +100,8 @@ void CSimPeriodDlg::Describe(PageForm& form) {
       .EnabledWhen(isHot)
       .RevalidatesLater();
   hot.Check("Use hot start date for simulation start date", n.SimStartFromHotStartDate)
-      .EnabledWhen([&n] { return n.HotStart && !n.HotStartResultFile.IsEmpty(); })
+      .EnabledWhen(isHot &&
+                   Sentence("a hot start result file is chosen", [&n] { return !n.HotStartResultFile.IsEmpty(); }))
       .RevalidatesLater();
 }
 
@@ -84,22 +115,25 @@ void CSimPeriodOnFlowDlg::Initialize() {
 
 void CSimPeriodOnFlowDlg::Describe(PageForm& form) {
   CSimPeriodOnFlowBase& n = Node();
-  const auto recycles = [&n](int type) { return [&n, type] { return n.RecyclingType == type; }; };
   form.Date("Start Date:", n.SimStart).RevalidatesLater();
   form.Date("End Date:", n.SimEnd).RevalidatesLater();
-  form.Radio("", n.RecyclingType,
-             {"No recycling on flow results", "Recycling on flow results", "Constant Water Movement Flow Field"})
+  form.Radio("", n.RecyclingType).RevalidatesLater();
+  form.Date("Cycle Restart Date:", n.CycleRestartDate)
+      .EnabledWhen(Is(n.RecyclingType, CSimPeriodOnFlowBase::kRecycling))
       .RevalidatesLater();
-  form.Date("Cycle Restart Date:", n.CycleRestartDate).EnabledWhen(recycles(1)).RevalidatesLater();
-  form.Date("Cycle End Date:", n.CycleEndDate).EnabledWhen(recycles(1)).RevalidatesLater();
-  form.Date("Date for Flow Field Solution:", n.FlowFieldSolutionDate).EnabledWhen(recycles(2)).RevalidatesLater();
+  form.Date("Cycle End Date:", n.CycleEndDate)
+      .EnabledWhen(Is(n.RecyclingType, CSimPeriodOnFlowBase::kRecycling))
+      .RevalidatesLater();
+  form.Date("Date for Flow Field Solution:", n.FlowFieldSolutionDate)
+      .EnabledWhen(Is(n.RecyclingType, CSimPeriodOnFlowBase::kConstantFlowField))
+      .RevalidatesLater();
 }
 
 // ---- Extra parameters
 
-void CExtraParamsDlg::Describe(PageForm& form) {
+void DescribeExtraParams(PageForm& form, CExtraParamsKvf& n) {
   using Item = CExtraParamsItemKvf;
-  auto table = std::make_shared<TableForm>(Node());
+  auto table = std::make_shared<TableForm>(n);
   table->ItemName("Parameter");
   table->Column<Item>("Name", 220, CellKind::Text, [](Item& item) -> std::string& { return item.Name; });
   table->Choice<Item>("Type", 100, [](Item& item) -> int& { return item.Type; },
@@ -156,5 +190,19 @@ void CExtraParamsDlg::Describe(PageForm& form) {
   };
   form.Table(std::move(table));
 }
+
+constexpr PageRow kPages[] = {
+    DescribedBy<DescribeTitle>(kSimTitlePage),
+    DescribedBy<DescribeTitle>(kSimTitleWQPage),
+    DescribedBy<DescribeTitle>(kSimTitlePTPage),
+    PageIs<CSimPeriodDlg, CSimPeriodKvf>(kSimPeriodPage),
+    PageIs<CSimPeriodOnFlowDlg, CSimPeriodOnFlowBase>(kSimPeriodWQPage),
+    PageIs<CSimPeriodOnFlowDlg, CSimPeriodOnFlowBase>(kSimPeriodPTPage),
+    DescribedBy<DescribeExtraParams>(kExtraParamsPage),
+};
+
+}  // namespace
+
+std::span<const PageRow> PeriodPages() { return kPages; }
 
 }  // namespace tervane

@@ -4,15 +4,29 @@
 
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/plot_content.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
+#include "spatial/data2d.h"
+#include "spatial/pages.h"
 
 namespace tervane {
 
 namespace {
 
-constexpr int kHorizontalLength = 100217;
+/// Any quantity with one value for each cell of the model.
+class CData2DDlg : public PageOf<CData2DKvf> {
+ public:
+  using PageOf::PageOf;
 
-}  // namespace
+  /// Builds the grid anew from its files.
+  void OnRefresh() override;
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  MapContent Map();
+};
 
 void CData2DDlg::OnRefresh() {
   Node().SetGridDataValid(0);
@@ -37,44 +51,39 @@ MapContent CData2DDlg::Map() {
 
 void CData2DDlg::Describe(PageForm& form) {
   CData2DKvf& n = Node();
-  const auto is = [&n](int type) { return [&n, type] { return n.Type == type; }; };
-  const auto isFile = [&n] { return n.Type != CData2DKvf::kUniform; };
-  const auto isScattered = [&n] { return n.Type == CData2DKvf::kShapeFile || n.Type == CData2DKvf::kXyzFile; };
-  const auto isInterpolated = [&n, isScattered] { return isScattered() && n.IsInterpolated(); };
+  const Condition isUniform = Is(n.Type, CData2DKvf::kUniform), isGrid = Is(n.Type, CData2DKvf::kGridFile);
+  const Condition isShape = Is(n.Type, CData2DKvf::kShapeFile), isXyz = Is(n.Type, CData2DKvf::kXyzFile);
+  const Condition isScattered = isShape || isXyz;
 
-  std::vector<std::string> sources{"Uniform", "Grid file (.nds2)"};
-  if (n.Kind().mayBeScattered) sources.insert(sources.end(), {"Point/Line (.shp)", "Point XYZ(.txt)"});
-  form.Choice("Data Type:", n.Type, std::move(sources)).RevalidatesLater();
+  Control& source = form.Choice("Data Type:", n.Type).RevalidatesLater();
+  if (!n.Kind().mayBeScattered) {
+    std::vector<std::string> sources = source.Options();
+    sources.resize(2);
+    source.options = [sources] { return sources; };
+  }
   if (n.IsCode()) {
     // Codes are whole numbers, whatever the file keeps them in.
     form.Integer(
             "Value", [&n] { return static_cast<int>(n.FixedValue); },
             [&n](int value) { n.FixedValue = static_cast<float>(value); })
         .Key("FixedValue")
-        .ShownWhen(is(CData2DKvf::kUniform));
+        .ShownWhen(isUniform);
   } else {
-    form.Number("Value", n.FixedValue).Quantity(n.GetItemType()).ShownWhen(is(CData2DKvf::kUniform));
+    form.Number("Value", n.FixedValue).ShownWhen(isUniform);
   }
-  form.DataFile("Filename:", n.GridFile())
-      .Filter(kGridFileFilter)
-      .DefaultExtension("nds2")
-      .ShownWhen(is(CData2DKvf::kGridFile));
-  form.ShapeFile("Filename:", n.ShapeFile())
-      .Filter(kShapeFileFilter)
-      .DefaultExtension("shp")
-      .ShownWhen(is(CData2DKvf::kShapeFile));
+  form.DataFile("Filename:", n.GridFile()).Filter(kGridFileFilter).DefaultExtension("nds2").ShownWhen(isGrid);
+  form.ShapeFile("Filename:", n.ShapeFile()).Filter(kShapeFileFilter).DefaultExtension("shp").ShownWhen(isShape);
   form.File("Filename:", n.XyzFile().File)
-      .Key("FILE_NAME")
       .Filter("XYZ files (*.txt) |*.txt|All Files (*.*) |*.*||")
       .DefaultExtension("txt")
-      .ShownWhen(is(CData2DKvf::kXyzFile));
-  form.Shown("Attribute:", [&n] { return n.GetNdsItemName(); }).ShownWhen(is(CData2DKvf::kGridFile));
+      .ShownWhen(isXyz);
+  form.Shown("Attribute:", [&n] { return n.GetNdsItemName(); }).ShownWhen(isGrid);
   form.Text(
           "Attribute:", [&n] { return n.ShapeFile().Attribute(); },
           [&n](const std::string& name) { n.ShapeFile().Choose(n.ShapeFile().File, name); })
-      .ShownWhen(is(CData2DKvf::kShapeFile));
-  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); })
-      .ShownWhen(is(CData2DKvf::kGridFile));
+      .Of(n.ShapeFile(), "ITEM_NUMBERS")
+      .ShownWhen(isShape);
+  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(isGrid);
   form.Button("Create...",
               [this] {
                 CData2DKvf& node = Node();
@@ -85,25 +94,32 @@ void CData2DDlg::Describe(PageForm& form) {
                 }
               })
       .Beside()
-      .ShownWhen(is(CData2DKvf::kGridFile));
+      .ShownWhen(isGrid);
   form.Button("Edit...",
               [this] {
                 if (Context().openDataFile) Context().openDataFile(Node().XyzFile().File.Absolute());
               })
-      .ShownWhen(is(CData2DKvf::kXyzFile));
+      .ShownWhen(isXyz);
   if (n.HasRelativeToGround()) form.Check("Values relative to ground", n.RelativeToGround);
 
-  PageForm& units = form.Group("Units of Shape Files");
-  form.Controls().back()->ShownWhen(isScattered);
-  UnitKeyChoice(units, "Units of X- and Y-axises:", "ShapeAxisUnit", n.ShapeAxisUnit, kCoordinateItemType);
+  PageForm& units = form.Group("Units of Shape Files", isScattered);
+  UnitKeyChoice(units, "Units of X- and Y-axises:", "ShapeAxisUnit", n.ShapeAxisUnit, quantity::kMapCoordinate);
   UnitKeyChoice(units, "Item Unit:", "ShapeItemUnit", n.ShapeItemUnit, n.Kind().itemType);
-  form.Choice("Interpolation Method:", n.InterpMethod,
-              {"Bilinear", "Triangular", "Inverse Distance", "Inverse Distance Squared"})
-      .ShownWhen(isInterpolated);
-  form.Number("Search Radius:", n.SearchRadius).Quantity(kHorizontalLength).ShownWhen(isInterpolated);
-  form.Check("Show grid data", n.ShowGridData).ShownWhen(isFile);
+  if (n.IsInterpolated()) {
+    form.Choice("Interpolation Method:", n.InterpMethod).ShownWhen(isScattered);
+    form.Number("Search Radius:", n.SearchRadius).ShownWhen(isScattered);
+  }
+  form.Check("Show grid data", n.ShowGridData).ShownWhen(!isUniform);
   form.Check("Show shape raw data", n.ShowShapeData).ShownWhen(isScattered);
-  form.Map([this] { return Map(); }).ShownWhen(isFile);
+  form.Map([this] { return Map(); }).ShownWhen(!isUniform);
 }
+
+constexpr PageRow kPages[] = {
+    PageIs<CData2DDlg, CData2DKvf>(kData2DPage),
+};
+
+}  // namespace
+
+std::span<const PageRow> Data2DPages() { return kPages; }
 
 }  // namespace tervane

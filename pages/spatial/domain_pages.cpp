@@ -8,22 +8,36 @@
 #include "geometry/cart.h"
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/plot_content.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
+#include "spatial/domain.h"
+#include "spatial/pages.h"
 
 namespace tervane {
 
 namespace {
 
-constexpr int kHorizontalLength = 100217;
+/// The model domain and its grid.
+class CCatchmentDlg : public PageOf<CCatchmentKvf> {
+ public:
+  using PageOf::PageOf;
 
-}  // namespace
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  /// A number of the grid: the file's, or the node's own, which can be changed.
+  Control& GridNumber(PageForm& form, const std::string& label, double& own, double GridGeometry::*inFile);
+  bool BrowseShape(Host& host, const Host::FileQuestion& question);
+  MapContent Map();
+};
 
 Control& CCatchmentDlg::GridNumber(PageForm& form, const std::string& label, double& own,
                                    double GridGeometry::*inFile) {
   CCatchmentKvf& n = Node();
   Control& control = form.Number(label, own);
   control.text = [&n, &control, inFile] { return ShownNumber(n.GetModelGeometry().*inFile, control.NumberUnit()); };
-  control.EnabledWhen([&n] { return n.Type == CCatchmentKvf::kShapeFile; });
+  control.EnabledWhen(Is(n.Type, CCatchmentKvf::kShapeFile));
   return control.RevalidatesLater();
 }
 
@@ -34,7 +48,7 @@ bool CCatchmentDlg::BrowseShape(Host& host, const Host::FileQuestion& asked) {
   question.current = n.ShapeFile().File.IsEmpty() ? folder : n.ShapeFile().File.Absolute();
   const auto path = host.AskFileToOpen(question);
   if (!path) return false;
-  const auto& units = FindItemType(kCoordinateItemType)->unitKeys;
+  const auto& units = FindItemType(quantity::kMapCoordinate)->unitKeys;
   Host::ItemQuestion axis;
   axis.title = "Shape axis units";
   axis.file = *path;
@@ -53,9 +67,8 @@ bool CCatchmentDlg::BrowseShape(Host& host, const Host::FileQuestion& asked) {
 
 void CCatchmentDlg::Describe(PageForm& form) {
   CCatchmentKvf& n = Node();
-  const auto fromGrid = [&n] { return n.Type == CCatchmentKvf::kGridFile; };
-  const auto fromShape = [&n] { return n.Type == CCatchmentKvf::kShapeFile; };
-  form.Radio("", n.Type, {"Catchment defined by Nds File", "Catchment defined by Shape File"}).RevalidatesLater();
+  const Condition fromGrid = Is(n.Type, CCatchmentKvf::kGridFile), fromShape = Is(n.Type, CCatchmentKvf::kShapeFile);
+  form.Radio("", n.Type).RevalidatesLater();
   form.DataFile("Filename:", n.GridFile())
       .Filter(kGridFileFilter)
       .DefaultExtension("nds2")
@@ -88,10 +101,10 @@ void CCatchmentDlg::Describe(PageForm& form) {
   };
   cells("NX:", "nxShp", n.nxShp, &GridGeometry::nx);
   cells("NY:", "nyShp", n.nyShp, &GridGeometry::ny);
-  GridNumber(grid, "Cell Size:", n.sizeShp, &GridGeometry::cellSize).Quantity(kHorizontalLength);
-  GridNumber(grid, "X0:", n.x0Shp, &GridGeometry::x0).Quantity(kHorizontalLength);
-  GridNumber(grid, "Y0:", n.y0Shp, &GridGeometry::y0).Quantity(kHorizontalLength);
-  GridNumber(grid, "Rotation:", n.rotationShp, &GridGeometry::rotation).Unit("[Deg, Counter clockwise]");
+  GridNumber(grid, "Cell Size:", n.sizeShp, &GridGeometry::cellSize);
+  GridNumber(grid, "X0:", n.x0Shp, &GridGeometry::x0);
+  GridNumber(grid, "Y0:", n.y0Shp, &GridGeometry::y0);
+  GridNumber(grid, "Rotation:", n.rotationShp, &GridGeometry::rotation);
   grid.Text(
           "Map Projection Type:", [&n] { return n.GetModelGeometry().projection; },
           [&n](const std::string& text) { n.MapProjShp = text; })
@@ -121,5 +134,13 @@ MapContent CCatchmentDlg::Map() {
   std::ranges::move(outline.awaited, std::back_inserter(map.awaited));
   return map;
 }
+
+constexpr PageRow kPages[] = {
+    PageIs<CCatchmentDlg, CCatchmentKvf>(kCatchmentPage),
+};
+
+}  // namespace
+
+std::span<const PageRow> DomainPages() { return kPages; }
 
 }  // namespace tervane

@@ -2,25 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include "forms/page.h"
-#include "forms/plots.h"
-#include "spatial/domain.h"
+#include <span>
+
+#include "forms/page_rows.h"
 
 namespace tervane {
 
-/// The model domain and its grid.
-class CCatchmentDlg : public PageOf<CCatchmentKvf> {
- public:
-  using PageOf::PageOf;
-
- protected:
-  void Describe(PageForm& form) override;
-
- private:
-  /// A number of the grid: the file's, or the node's own, which can be changed.
-  Control& GridNumber(PageForm& form, const std::string& label, double& own, double GridGeometry::*inFile);
-  bool BrowseShape(Host& host, const Host::FileQuestion& question);
-  MapContent Map();
-};
+/// The page of the model domain and its grid.
+std::span<const PageRow> DomainPages();
 
 }  // namespace tervane

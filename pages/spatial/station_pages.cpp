@@ -6,7 +6,11 @@
 
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/plot_content.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
+#include "spatial/pages.h"
+#include "spatial/stations.h"
+#include "surface/pages.h"
 
 namespace tervane {
 
@@ -21,22 +25,20 @@ struct ValueOrSeries {
 };
 
 /// The controls of a value or a series; `isShown` says whether this form of the data is in force.
-void DescribeValueOrSeries(PageForm& form, CYbSEDlgBase& page, const PageContext& context, ValueOrSeries data,
-                           const std::function<bool()>& isShown) {
-  const auto isConstant = [isShown, &type = data.type] { return isShown() && type == 0; };
-  const auto isSeries = [isShown, &type = data.type] { return isShown() && type == 1; };
-  form.Number("Value:", data.value).Quantity(data.itemTypes.front()).ShownWhen(isConstant);
+void DescribeValueOrSeries(PageForm& form, CYbSEDlgBase& page, ValueOrSeries data, const Condition& isShown = {}) {
+  const Condition isConstant = isShown && Is(data.type, 0), isSeries = isShown && Is(data.type, 1);
+  form.Number("Value:", data.value).ShownWhen(isConstant);
   CFMData0DFile& file = data.file;
   form.DataFile("Time Series File:", file).Filter(kSeriesFileFilter).DefaultExtension("nds0").ShownWhen(isSeries);
   form.Button("Edit...",
-              [&file, context] {
-                if (context.openDataFile) context.openDataFile(file.File.Absolute());
+              [&file, &page] {
+                if (page.Context().openDataFile) page.Context().openDataFile(file.File.Absolute());
               })
       .ShownWhen(isSeries);
   form.Button("Create...",
-              [&page, context, &file, &value = data.value, items = data.itemTypes, kinds = data.valueTypes] {
-                if (!MayCreateFile(context)) return;
-                CTvnCreate0DNdsDlg dialog(context, page.Node(), value, items, kinds);
+              [&page, &file, &value = data.value, items = data.itemTypes, kinds = data.valueTypes] {
+                if (!MayCreateFile(page.Context())) return;
+                CTvnCreate0DNdsDlg dialog(page.Context(), page.Node(), value, items, kinds);
                 if (const auto made = dialog.Run()) {
                   file.Choose(*made);
                   page.UpdateDoc(kDataChanged, "Create Time Series File");
@@ -63,10 +65,20 @@ MapContent StationMap(const C2DStationBasedDataKvf& data, const CFMSEKvfGroupBas
   return map;
 }
 
-constexpr int kElevation = 100180;
-const std::vector<std::string> kTemporal{"Constant", "Time varying (.nds0)"};
+/// A forcing: uniform, by stations, or fully distributed.
+class C2DStationBasedDataDlg : public PageOf<C2DStationBasedDataKvf> {
+ public:
+  using PageOf::PageOf;
 
-}  // namespace
+  /// Looks at the files again.
+  void OnRefresh() override;
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  int Sync();
+};
 
 int C2DStationBasedDataDlg::Sync() {
   C2DStationBasedDataKvf& n = Node();
@@ -84,31 +96,24 @@ void C2DStationBasedDataDlg::OnRefresh() {
 void C2DStationBasedDataDlg::Describe(PageForm& form) {
   using Node_ = C2DStationBasedDataKvf;
   Node_& n = Node();
-  const auto is = [&n](int distribution) { return [&n, distribution] { return n.DistributionType == distribution; }; };
-  const auto byCodes = [&n] { return n.UsesGridCodes(); };
-  const auto byPolygons = [&n] { return n.UsesPolygons(); };
+  const auto is = [&n](int distribution) { return Is(n.DistributionType, distribution); };
+  const Condition byCodes = is(Node_::kStationBased) && Is(n.Stations().TYPE, CStationBasedKvf::kGridCodes);
+  const Condition byPolygons = is(Node_::kStationBased) && Is(n.Stations().TYPE, CStationBasedKvf::kPolygons);
   const auto sync = [this] { return Sync(); };
-  form.Choice("Spatial Distribution:", n.DistributionType, {"Uniform", "Station based", "Fully distributed"})
-      .RevalidatesLater()
-      .Then([this] {
-        if (Node().DistributionType == Node_::kFullyDistributed && Node().IsCorrectedForElevation())
-          Outside().Tell(fmt::format("Warning: Fully distributed {} cannot be corrected for elevation.",
-                                     Node().Kind().correctable),
-                         Host::Icon::Warning);
-        return 0;
-      });
-  form.Choice("Temporal Distribution:", n.Global().TYPE, kTemporal).Key("TYPE").ShownWhen(is(Node_::kUniform));
-  form.Choice("Data Type:", n.Stations().TYPE, {"Grid codes (.nds2)", "Polygons (.shp)"})
-      .ShownWhen(is(Node_::kStationBased))
-      .Then(sync);
+  form.Choice("Spatial Distribution:", n.DistributionType).RevalidatesLater().Then([this] {
+    if (Node().DistributionType == Node_::kFullyDistributed && Node().IsCorrectedForElevation())
+      Outside().Tell(
+          fmt::format("Warning: Fully distributed {} cannot be corrected for elevation.", Node().Kind().correctable),
+          Host::Icon::Warning);
+    return 0;
+  });
+  form.Choice("Temporal Distribution:", n.Global().TYPE).ShownWhen(is(Node_::kUniform));
+  form.Choice("Data Type:", n.Stations().TYPE).ShownWhen(is(Node_::kStationBased)).Then(sync);
   DescribeValueOrSeries(
-      form, *this, Context(),
+      form, *this,
       {n.Global().TYPE, n.Global().FIXED_VALUE, n.Global().SeriesFile(), n.Kind().itemTypes, n.Kind().valueTypes},
       is(Node_::kUniform));
-  if (n.HasElevation())
-    form.Number("Elevation:", n.Elevation).Quantity(kElevation).ShownWhen([&n] {
-      return n.DistributionType == Node_::kUniform && n.IsCorrectedForElevation();
-    });
+  if (n.HasElevation()) form.Number("Elevation:", n.Elevation).ShownWhen(is(Node_::kUniform) && n.Kind().correctedWhen);
 
   form.DataFile("Station Based Distribution File:", n.Stations().GridFile())
       .Filter("Station distr.files (*.nds2) |*.nds2|All Files (*.*) |*.*||")
@@ -120,7 +125,7 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
   form.Button("Create...",
               [this] {
                 if (!MayCreateFile(Context())) return;
-                CData2DNdsCreateDlg dialog(Context(), 1.0F, Node(), kCodeItemType);
+                CData2DNdsCreateDlg dialog(Context(), 1.0F, Node(), quantity::kCode);
                 if (const auto file = dialog.Run()) {
                   Node().Stations().GridFile().Choose(*file);
                   UpdateDoc(Sync(), "Create Grid File");
@@ -134,7 +139,7 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
       .ShownWhen(byPolygons)
       .Then(sync);
   form.Shown("Item Name:", [&n] { return n.Stations().ShapeFile().Attribute(); }).ShownWhen(byPolygons);
-  UnitKeyChoice(form, "Unit of X- and Y-axes", "ShapeAxisUnit", n.Stations().ShapeAxisUnit, kCoordinateItemType)
+  UnitKeyChoice(form, "Unit of X- and Y-axes", "ShapeAxisUnit", n.Stations().ShapeAxisUnit, quantity::kMapCoordinate)
       .ShownWhen(byPolygons);
   GapFillChoice(form, n.Stations().ShapeGapFillName, n).ShownWhen(byPolygons);
   form.DataFile("Fully Distribution File:", n.FullyDistributed().GridFile())
@@ -153,37 +158,48 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
         };
         return map;
       })
-      .ShownWhen([&n] { return n.DistributionType != Node_::kUniform; });
+      .ShownWhen(!is(Node_::kUniform));
 }
 
-void C2DStationBaseDataTimeSeriesDlg::Describe(PageForm& form) {
-  C2DStationBasedDataTimeSeriesKvf& n = Node();
+void DescribeStation(PageForm& form, C2DStationBasedDataTimeSeriesKvf& n, CYbSEDlgBase& page) {
   const auto* data = dynamic_cast<const C2DStationBasedDataKvf*>(n.GetParent());
   form.Text("Station ID:", n.NAME).Hint(kTreeRebuilt | kDataChanged).Then([&n] {
     return n.SetAbbreviatedTitle(n.NAME), 0;
   });
-  form.Choice("Temporal Distribution:", n.TYPE, kTemporal);
-  form.Shown("Grid code value:", [&n] { return n.GRIDCODEID; }).ShownWhen([data] {
+  form.Choice("Temporal Distribution:", n.TYPE);
+  form.Shown("Grid code value:", [&n] { return n.GRIDCODEID; }).ShownWhen("the areas are grid codes", [data] {
     return data && data->UsesGridCodes();
   });
-  form.Shown("Polygon:", [&n] { return n.GRIDCODEID; }).ShownWhen([data] { return data && data->UsesPolygons(); });
+  form.Shown("Polygon:", [&n] { return n.GRIDCODEID; }).ShownWhen("the areas are polygons", [data] {
+    return data && data->UsesPolygons();
+  });
   if (!data) return;
-  DescribeValueOrSeries(form, *this, Context(),
-                        {n.TYPE, n.FIXED_VALUE, n.SeriesFile(), data->Kind().itemTypes, data->Kind().valueTypes},
-                        [] { return true; });
-  if (data->HasElevation())
-    form.Number("Elevation:", n.Elevation).Quantity(kElevation).ShownWhen([data] {
-      return data->IsCorrectedForElevation();
-    });
+  DescribeValueOrSeries(form, page,
+                        {n.TYPE, n.FIXED_VALUE, n.SeriesFile(), data->Kind().itemTypes, data->Kind().valueTypes});
+  if (data->HasElevation()) form.Number("Elevation:", n.Elevation).ShownWhen(data->Kind().correctedWhen);
   form.Map([&n, data] { return StationMap(*data, &n); });
 }
 
-void CTimeseriesConstDlg::Describe(PageForm& form) {
-  CTimeseriesConstKvf& n = Node();
-  form.Choice("Temporal Distribution:", n.Global().TYPE, kTemporal).Key("TYPE");
-  DescribeValueOrSeries(form, *this, Context(),
-                        {n.Global().TYPE, n.Global().FIXED_VALUE, n.Global().SeriesFile(), {n.GetItemType()}, {3}},
-                        [] { return true; });
+void DescribeTimeConstant(PageForm& form, CTimeseriesConstKvf& n, CYbSEDlgBase& page) {
+  form.Choice("Temporal Distribution:", n.Global().TYPE);
+  DescribeValueOrSeries(form, page,
+                        {n.Global().TYPE, n.Global().FIXED_VALUE, n.Global().SeriesFile(), {n.GetItemType()}, {3}});
 }
+
+constexpr PageRow kPages[] = {
+    PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kStationBasedDataPage),
+    PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kPrecipitationPage),
+    PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kPotEvapTransPage),
+    PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kAirTemperaturePage),
+    DescribedBy<DescribeStation>(kStationPage),
+    DescribedBy<DescribeStation>(kPrecipitationStationPage),
+    DescribedBy<DescribeStation>(kPotEvapTransStationPage),
+    DescribedBy<DescribeStation>(kAirTemperatureStationPage),
+    DescribedBy<DescribeTimeConstant>(kTimeseriesConstPage),
+};
+
+}  // namespace
+
+std::span<const PageRow> StationPages() { return kPages; }
 
 }  // namespace tervane

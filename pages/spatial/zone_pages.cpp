@@ -5,13 +5,14 @@
 #include "forms/table_form.h"
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/plot_content.h"
+#include "platform/item_types.h"
 #include "platform/units.h"
+#include "spatial/pages.h"
+#include "spatial/zones.h"
 
 namespace tervane {
 
 namespace {
-
-constexpr int kChainage = 100143;
 
 /// The map of the zones of a parent, one of them standing out.
 MapContent ZoneMap(const CodedZonesKvf& zones, const CFMSEKvfGroupBase* highlighted) {
@@ -28,7 +29,20 @@ MapContent ZoneMap(const CodedZonesKvf& zones, const CFMSEKvfGroupBase* highligh
   return map;
 }
 
-}  // namespace
+/// Where the zones come from, for all nodes with zones of their own.
+class CSubcatchmentDlg : public PageOf<CodedZonesKvf> {
+ public:
+  using PageOf::PageOf;
+
+  /// Looks at the files again.
+  void OnRefresh() override;
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  int Sync();
+};
 
 int CSubcatchmentDlg::Sync() {
   CodedZonesKvf& n = Node();
@@ -44,12 +58,12 @@ void CSubcatchmentDlg::OnRefresh() {
 
 void CSubcatchmentDlg::Describe(PageForm& form) {
   CodedZonesKvf& n = Node();
-  const auto isDistributed = [&n] { return n.DistributionType == CodedZonesKvf::kDistributed; };
-  const auto byCodes = [&n] { return n.UsesGridCodes(); };
-  const auto byPolygons = [&n] { return n.UsesPolygons(); };
+  const Condition isDistributed = Is(n.DistributionType, CodedZonesKvf::kDistributed);
+  const Condition byCodes = isDistributed && Is(n.Type, CodedZonesKvf::kGridCodes);
+  const Condition byPolygons = isDistributed && Is(n.Type, CodedZonesKvf::kPolygons);
   const auto sync = [this] { return Sync(); };
-  form.Choice("Spatial Distribution:", n.DistributionType, {"Uniform", "Distributed"}).Then(sync);
-  form.Choice("Data Type:", n.Type, {"Grid codes (.nds2)", "Polygons (.shp)"}).ShownWhen(isDistributed).Then(sync);
+  form.Choice("Spatial Distribution:", n.DistributionType).Then(sync);
+  form.Choice("Data Type:", n.Type).ShownWhen(isDistributed).Then(sync);
   form.DataFile("Grid Distribution File:", n.GridFile())
       .Filter("UZ soil profile distr.files (*.nds2) |*.nds2|All Files (*.*) |*.*||")
       .DefaultExtension("nds2")
@@ -60,7 +74,7 @@ void CSubcatchmentDlg::Describe(PageForm& form) {
       .ShownWhen(byCodes);
   form.Button("Create...",
               [this] {
-                CData2DNdsCreateDlg dialog(Context(), 1.0F, Node(), kCodeItemType);
+                CData2DNdsCreateDlg dialog(Context(), 1.0F, Node(), quantity::kCode);
                 if (const auto file = dialog.Run()) {
                   Node().GridFile().Choose(*file);
                   UpdateDoc(Sync(), "Create Grid File");
@@ -74,7 +88,7 @@ void CSubcatchmentDlg::Describe(PageForm& form) {
       .ShownWhen(byPolygons)
       .Then(sync);
   form.Shown("Item Name:", [&n] { return n.ShapeFile().Attribute(); }).ShownWhen(byPolygons);
-  UnitKeyChoice(form, "Units of X- and Y-axises:", "ShapeAxisUnit", n.ShapeAxisUnit, kCoordinateItemType)
+  UnitKeyChoice(form, "Units of X- and Y-axises:", "ShapeAxisUnit", n.ShapeAxisUnit, quantity::kMapCoordinate)
       .ShownWhen(byPolygons);
   GapFillChoice(form, n.ShapeGapFillName, n).ShownWhen(byPolygons);
   form.Map([this] {
@@ -93,32 +107,43 @@ void CSubcatchmentDlg::Describe(PageForm& form) {
       .ShownWhen(isDistributed);
 }
 
-void CSubcatchmentPropDlg::Describe(PageForm& form) {
-  CSubcatchmentPropKvf& n = Node();
+void DescribeSubcatchment(PageForm& form, CSubcatchmentPropKvf& n) {
   const auto* zones = dynamic_cast<const CodedZonesKvf*>(n.GetParent());
   form.Text("Name:", n.Name).Hint(kTreeRebuilt | kDataChanged).Then([&n] { return n.SetAbbreviatedTitle(n.Name), 0; });
-  form.Shown("Grid code value:", [&n] { return n.GRIDCODEID; }).ShownWhen([zones] {
+  form.Shown("Grid code value:", [&n] { return n.GRIDCODEID; }).ShownWhen("the zones are grid codes", [zones] {
     return zones && zones->UsesGridCodes();
   });
-  form.Shown("Polygon:", [&n] { return n.GRIDCODEID; }).ShownWhen([zones] { return zones && zones->UsesPolygons(); });
+  form.Shown("Polygon:", [&n] { return n.GRIDCODEID; }).ShownWhen("the zones are polygons", [zones] {
+    return zones && zones->UsesPolygons();
+  });
   // A bool in the file.
   Control& links = form.Check("Use default river links", n.DefaultRiverLinks);
   links.Hint(kTreeRebuilt | kDataChanged);
-  form.Map([&n, zones] { return ZoneMap(*zones, &n); }).ShownWhen([zones] {
+  form.Map([&n, zones] { return ZoneMap(*zones, &n); }).ShownWhen("the zones are distributed", [zones] {
     return zones && zones->DistributionType == CodedZonesKvf::kDistributed;
   });
 }
 
-void CSubcatchmentRiverLinksDlg::Describe(PageForm& form) {
+void DescribeRiverLinks(PageForm& form, CSubcatchmentRiverlinksListKvf& n) {
   using Item = CSubcatchmentRiverlinkItemKvf;
-  auto table = std::make_shared<TableForm>(Node());
+  auto table = std::make_shared<TableForm>(n);
   table->ItemName("River Link");
   table->Column<Item>("Branch name", 220, CellKind::Text, [](Item& item) -> std::string& { return item.Branchname; });
   table->Column<Item>("Upstream", 120, CellKind::Number, [](Item& item) -> float& { return item.Upstream; }).itemType =
-      kChainage;
+      quantity::kChainage;
   table->Column<Item>("Downstream", 120, CellKind::Number, [](Item& item) -> float& { return item.Downstream; })
-      .itemType = kChainage;
+      .itemType = quantity::kChainage;
   form.Table(std::move(table));
 }
+
+constexpr PageRow kPages[] = {
+    PageIs<CSubcatchmentDlg, CodedZonesKvf>(kSubcatchmentPage),
+    DescribedBy<DescribeSubcatchment>(kSubcatchmentPropPage),
+    DescribedBy<DescribeRiverLinks>(kRiverLinksPage),
+};
+
+}  // namespace
+
+std::span<const PageRow> ZonePages() { return kPages; }
 
 }  // namespace tervane

@@ -8,6 +8,7 @@
 #include <atomic>
 #include <memory>
 
+#include "platform/item_types.h"
 #include "shell/maps/map_canvas.h"
 #include "shell/widgets/theme.h"
 
@@ -19,7 +20,7 @@ inline double Scaled(double pixels) { return pixels * Theme::Get().Zoom(); }
 /// Between map and legend, in pixels at zoom 1.
 inline constexpr int kLegendPadding = 10;
 
-inline ShownUnit CoordinateUnit(const DisplayUnits& units) { return {kCoordinateItemType, 1000, &units}; }
+inline ShownUnit CoordinateUnit(const DisplayUnits& units) { return {quantity::kMapCoordinate, 1000, &units}; }
 
 /// A grid with its picture, which may still be in the making.
 struct MapCanvas::Layer {

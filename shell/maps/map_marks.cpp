@@ -8,6 +8,7 @@
 #include <array>
 #include <cmath>
 
+#include "platform/item_types.h"
 #include "shell/maps/map_canvas_parts.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -147,7 +148,7 @@ QString MapCanvas::LegendTitle(const Layer& layer) const {
   const CTvn2DOrthoRotatedGridData& grid = *layer.grid.grid;
   QString title = ToQt(grid.ItemName());
   const ItemType* item = FindItemType(grid.ItemType());
-  if (title.isEmpty() && item && item->code != kUndefinedItemType) title = Translated(std::string(item->name));
+  if (title.isEmpty() && item && item->code != quantity::kUndefined) title = Translated(std::string(item->name));
   const std::string unit = ShownUnit(grid.ItemType(), grid.ItemUnit(), &units_).Text();
   if (!unit.empty() && !layer.grid.isCodes) title += (title.isEmpty() ? "[" : " [") + ToQt(unit) + "]";
   return title;

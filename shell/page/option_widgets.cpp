@@ -104,7 +104,7 @@ class RadioWidget : public ControlWidget {
       column->addWidget(button);
     }
     MakeField(box, false);
-    connect(group_, &QButtonGroup::idClicked, this, [this](int id) { Enter(QString::number(id)); });
+    connect(group_, &QButtonGroup::idClicked, this, [this](int id) { Enter(ToQt(Described().OptionValue(id))); });
   }
   QWidget* FocusTarget() const override {
     return group_->checkedButton() ? group_->checkedButton() : group_->button(0);
@@ -131,7 +131,7 @@ class ChoiceWidget : public ControlWidget {
     list_->setMinimumWidth(Theme::Get().Scaled(kChoiceWidth));
     MakeField(list_, false);
     connect(list_, &QComboBox::activated, this, [this](int index) {
-      if (index < static_cast<int>(shown_.size())) Enter(QString::number(index));
+      if (index < static_cast<int>(shown_.size())) Enter(ToQt(Described().OptionValue(index)));
     });
   }
   QWidget* FocusTarget() const override { return list_; }

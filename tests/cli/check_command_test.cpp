@@ -31,9 +31,9 @@ TEST(CheckCommand, TheRhoneIsWhole) {
     CFlowModelDoc document;
     ASSERT_TRUE(document.OnOpenDocument(kFolder + name)) << document.Error();
     auto& root = document.Root();
-    auto* domain = root.Important<CCatchmentKvf>("CATCHMENT");
-    auto* topography = root.Important<CTopographyKvf>("TOPOGRAPHY");
-    auto* subcatchments = root.Important<CSubcatchmentKvf>("SUBCATCHMENT");
+    auto* domain = root.Important(kDomain);
+    auto* topography = root.Important(kTopography);
+    auto* subcatchments = root.Important(kSubcatchments);
     ASSERT_TRUE(domain && topography && subcatchments);
     std::string problem;
     const auto cells = domain->GetDomainGrid(&problem);

@@ -134,8 +134,8 @@ TEST(Node, ImportantNodesAreFoundByNameUntilTheyAreTakenOutOrDie) {
   root.RegisterImportantNode(deep, "DEEP");
   root.RegisterImportantNode(deep, "ALSO DEEP");
   EXPECT_EQ(root.GetImportantNode("deep"), nullptr);
-  EXPECT_EQ(deep->Important<ValueNode>("NODE"), node);
-  EXPECT_EQ(deep->Important<ValueGroup>("NODE"), nullptr);  // Of another class.
+  EXPECT_EQ(deep->Important(ImportantName<ValueNode>{"NODE"}), node);
+  EXPECT_EQ(deep->Important(ImportantName<ValueGroup>{"NODE"}), nullptr);  // Of another class.
   root.UnregisterImportantNode("ALSO DEEP");
   EXPECT_EQ(root.GetImportantNode("ALSO DEEP"), nullptr);
   EXPECT_EQ(root.GetImportantNode("DEEP"), deep);
@@ -146,7 +146,7 @@ TEST(Node, ImportantNodesAreFoundByNameUntilTheyAreTakenOutOrDie) {
   root.RemoveChild(node).reset();
   EXPECT_EQ(root.GetImportantNode("NODE"), heir);
   EXPECT_EQ(root.GetImportantNode("DEEP"), nullptr);
-  EXPECT_EQ(ValueNode(nullptr).Important<ValueNode>("NODE"), nullptr);
+  EXPECT_EQ(ValueNode(nullptr).Important(ImportantName<ValueNode>{"NODE"}), nullptr);
   root.retired = root.RemoveChild(heir);
   EXPECT_EQ(root.GetImportantNode("NODE"), heir);  // Lives on registered.
   root.AddProperty(std::make_unique<ValueNode>("Property", &root));

@@ -38,9 +38,9 @@ class UndoOfASetup : public testing::Test {
 
 TEST_F(UndoOfASetup, EveryKindOfChangeIsUndoneAndRedone) {
   auto& list = *document.Root().Child<CExtraParamsKvf>();
-  auto& period = *document.Root().Important<CSimPeriodKvf>("SIMPERIOD");
-  auto& components = *document.Root().Important<CModModelCompKvf>("MODMODELCOMP");
-  document.Root().Important<CBasicParaKvf>("BASICPARAMETERS")->ModelType = 1;
+  auto& period = *document.Root().Important(kSimulationPeriod);
+  auto& components = *document.Root().Important(kModflowComponents);
+  document.Root().Important(kBasicParameters)->ModelType = 1;
   undo.Reset();
   const std::pair<const char*, std::function<void()>> changes[] = {
       {"type a title", [&] { PageDriver(document, "SimSpec/SimTitle").Enter("Simulation Title:", "Karup"); }},
@@ -93,7 +93,7 @@ TEST_F(UndoOfASetup, NothingChangedIsNoStepAndOneControlWithinASecondIsOne) {
   EXPECT_FALSE(undo.Commit("nothing"));
   const UndoStack::Time start{};
   int control = 0, other = 0;
-  auto& title = *document.Root().GetImportantNode("BASICPARAMETERS")->Child<CSimTitleKvf>();
+  auto& title = *document.Root().Important(kBasicParameters)->Child<CSimTitleKvf>();
   const auto type = [&](const char* text, const void* source, int milliseconds) {
     title.Title = text;
     EXPECT_TRUE(undo.Commit("Change Title", source, start + std::chrono::milliseconds(milliseconds)));
@@ -112,7 +112,7 @@ TEST_F(UndoOfASetup, NothingChangedIsNoStepAndOneControlWithinASecondIsOne) {
 }
 
 TEST_F(UndoOfASetup, KnowsWhetherTheTreeIsAsItWasSaved) {
-  auto& basics = *document.Root().Important<CBasicParaKvf>("BASICPARAMETERS");
+  auto& basics = *document.Root().Important(kBasicParameters);
   const auto change = [&](int engine) {
     basics.ModelType = engine;
     undo.Commit("Change Engine");

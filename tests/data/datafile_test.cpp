@@ -9,6 +9,7 @@
 #include <fmt/format.h>
 #include <gmock/gmock.h>
 
+#include "platform/item_types.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {
@@ -69,7 +70,7 @@ TEST_F(ForeignFile, PackedGeographicalNorthFirstGridIsReadInEveryKind) {
     ASSERT_EQ(file.Items().size(), 1u);
     const DataItem& item = file.Items()[0];
     EXPECT_EQ(item.name, "2 m temperature");
-    EXPECT_EQ(item.itemType, kUndefinedItemType);
+    EXPECT_EQ(item.itemType, quantity::kUndefined);
     EXPECT_EQ(item.unitKey, 2802);
     EXPECT_EQ(item.valueType, ValueType::MeanStep);
     EXPECT_EQ(item.dimensions, 2);

@@ -13,6 +13,7 @@
 #include "data/datafile_request.h"
 #include "data/grid_files.h"
 #include "geometry/cart.h"
+#include "platform/item_types.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {
@@ -95,7 +96,7 @@ TEST(RasterFile, ARasterIsADataFileOfOneStep) {
   ASSERT_EQ(file.Items().size(), 1u);
   const DataItem& item = file.Items()[0];
   EXPECT_EQ(item.name, "ground");
-  EXPECT_EQ(item.itemType, kUndefinedItemType);
+  EXPECT_EQ(item.itemType, quantity::kUndefined);
   EXPECT_EQ(item.dimensions, 2);
   EXPECT_EQ(item.geometry.x0, 100);
   EXPECT_FALSE(item.hasTime);

@@ -161,7 +161,7 @@ TEST_F(EditSessionTest, FindingsFollowChangesOfTheNodeOrOfAllWhereThatWasAskedFo
   // The water quality begins before the water movement.
   CYbSEKvfBase& dates = *FindNode(root, ParseSetupPath("ModelCompWQ/SimulationPeriodWQ").steps);
   EXPECT_THAT(dates.Findings(), Not(IsEmpty()));
-  auto& period = *root.Important<CSimPeriodKvf>("SIMPERIOD");
+  auto& period = *root.Important(kSimulationPeriod);
   period.SIMSTART = CYbDateTime{1990, 1, 1};
   session->UpdateDoc(period, 1, "Change Start Date");
   EXPECT_THAT(dates.Findings(), Not(IsEmpty()));

@@ -102,7 +102,7 @@ TEST_F(FlowModelDocument, RunsTheEngineOnTheSavedFile) {
   shell.isShiftHeld = false;
   // The log of an earlier start stays.
   river->file = FileName("other.fvsim", "/data");
-  document.Root().Important<CModelCompKvf>("MODELCOMP")->River = 0;
+  document.Root().Important(kModelComponents)->River = 0;
   document.RunEngine("/PP");
   document.RunExtraction(1, -1);
   shell.canSave = false;

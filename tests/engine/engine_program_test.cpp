@@ -10,6 +10,7 @@
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "execution/execute_flags.h"
+#include "platform/item_types.h"
 #include "simspec/model_components.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"
@@ -34,15 +35,15 @@ class EngineProgram : public testing::Test {
  protected:
   EngineProgram() {
     WriteGrid("domain.nds2", {4, 4, 100, 1000, 2000, 0, {}}, {2, 2, 2, 2, 2, 1, 1, 2, 2, 1, 1, 2, kEmpty, 2, 2, kEmpty},
-              kCodeItemType);
+              quantity::kCode);
     Domain().GridFile().Choose(FileName("domain.nds2", folder.Path()));
     Domain().Type = CCatchmentKvf::kGridFile;
   }
   void WriteGrid(const std::string& name, const GridGeometry& geometry, std::vector<float> values, int itemType) {
     test::WriteGrid(folder.File(name), geometry, std::move(values), itemType);
   }
-  CCatchmentKvf& Domain() { return *document.Root().Important<CCatchmentKvf>("CATCHMENT"); }
-  CTopographyKvf& Topography() { return *document.Root().Important<CTopographyKvf>("TOPOGRAPHY"); }
+  CCatchmentKvf& Domain() { return *document.Root().Important(kDomain); }
+  CData2DKvf& Topography() { return *document.Root().Important(kTopography); }
 
   EngineStatus Run(const std::string& option) {
     EXPECT_TRUE(document.OnSaveDocument(folder.File("a.tvd"))) << document.Error();
@@ -97,9 +98,9 @@ TEST_F(EngineProgram, PutsQuantitiesOnTheCellsOfTheDomain) {
 }
 
 TEST_F(EngineProgram, TellsCellsWithoutValueAndZonesByName) {
-  WriteGrid("codes.nds2", {2, 4, 100, 1000, 2000, 0, {}}, {5, 5, 5, 5, 8, 8, 8, 8}, kCodeItemType);
-  document.Root().Important<CModelCompKvf>("MODELCOMP")->OL_ModelType = 1;
-  auto& zones = *document.Root().Important<CSubcatchmentKvf>("SUBCATCHMENT");
+  WriteGrid("codes.nds2", {2, 4, 100, 1000, 2000, 0, {}}, {5, 5, 5, 5, 8, 8, 8, 8}, quantity::kCode);
+  document.Root().Important(kModelComponents)->OL_ModelType = 1;
+  auto& zones = *document.Root().Important(kSubcatchments);
   zones.GridFile().Choose(FileName("codes.nds2", folder.Path()));
   zones.Type = CodedZonesKvf::kGridCodes;
   ASSERT_EQ(zones.SyncZones(), kAdded);
@@ -122,8 +123,8 @@ TEST_F(EngineProgram, TakesTheMeanOfTheStepsOfTheSimulation) {
     ASSERT_EQ(writer.Put(1, std::vector<float>(16, static_cast<float>(100 / day))), "");
   }
   ASSERT_EQ(writer.Finish().error, "");
-  document.Root().Important<CSimPeriodKvf>("SIMPERIOD")->SIMEND = {2000, 1, 3};
-  auto& rain = *document.Root().Important<CPrecipitationKvf>("PRECIPITATION");
+  document.Root().Important(kSimulationPeriod)->SIMEND = {2000, 1, 3};
+  auto& rain = *document.Root().Important(kPrecipitation);
   rain.DistributionType = C2DStationBasedDataKvf::kFullyDistributed;
   rain.FullyDistributed().GridFile().Choose(FileName("rain.nds2", folder.Path()));
 
@@ -158,7 +159,7 @@ TEST(EngineProgramExample, ReportsTheRhone) {
 }
 
 TEST_F(EngineProgram, RefusesWhatItCannotDo) {
-  auto& flags = *document.Root().Important<CExecuteEngineFlagsKvf>("EXECUTE_ENGINE_FLAGS");
+  auto& flags = *document.Root().Important(kExecuteFlags);
   struct Case {
     const char* what;
     std::function<void()> prepare;

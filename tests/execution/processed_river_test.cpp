@@ -7,6 +7,7 @@
 
 #include <gmock/gmock.h>
 
+#include "platform/item_types.h"
 #include "tests/support/preprocessed_run.h"
 #include "tests/support/temp_folder.h"
 
@@ -46,7 +47,7 @@ TEST(ProcessedRiver, AllIsReadAsItWasWritten) {
   EXPECT_EQ(river.secondLinks->Geometry(), expected);
   EXPECT_EQ(river.firstLinks->Value(3, 2), 7);
   EXPECT_EQ(river.secondLinks->Value(3, 2), -1);
-  EXPECT_EQ(river.firstLinks->ItemType(), kCodeItemType);
+  EXPECT_EQ(river.firstLinks->ItemType(), quantity::kCode);
   EXPECT_EQ(river.firstLinks->ItemUnit(), kWholeNumberUnit);
   EXPECT_THAT(river.flags, ElementsAre(3, 0, 0, 3, 0));
   EXPECT_THAT(river.x, ElementsAre(0, 10, 20, 50, 60));

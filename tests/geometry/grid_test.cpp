@@ -9,6 +9,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "platform/item_types.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {
@@ -20,7 +21,7 @@ using Grid = CTvn2DOrthoRotatedGridData;
 
 Grid GridOf(GridGeometry geometry, std::vector<float> values) {
   Grid grid;
-  EXPECT_EQ(grid.TakeValues(std::move(geometry), std::move(values), -1, 0, kCodeItemType), "");
+  EXPECT_EQ(grid.TakeValues(std::move(geometry), std::move(values), -1, 0, quantity::kCode), "");
   return grid;
 }
 

@@ -25,7 +25,7 @@ class GridState : public testing::Test {
 
   test::TempFolder folder;
   CFlowModelDoc document;
-  COverlaysKvf& maps = *document.Root().Important<COverlaysKvf>("OVERLAY_DATA");
+  COverlaysKvf& maps = *document.Root().Important(kOverlays);
   test::ScriptedHost host;
 };
 

@@ -50,8 +50,8 @@ TEST(Overlays, ReadsWhatOldFilesHold) {
 
 TEST(Overlays, TheShownAreaFollowsTheDomainOrStays) {
   CFlowModelDoc document;
-  auto& maps = *document.Root().Important<COverlaysKvf>("OVERLAY_DATA");
-  auto& domain = *document.Root().Important<CCatchmentKvf>("CATCHMENT");
+  auto& maps = *document.Root().Important(kOverlays);
+  auto& domain = *document.Root().Important(kDomain);
   domain.Type = CCatchmentKvf::kShapeFile;
   domain.nxShp = 10;
   domain.nyShp = 20;

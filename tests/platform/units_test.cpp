@@ -19,6 +19,7 @@
 #include <gtest/gtest.h>
 #include <udunits2.h>
 
+#include "platform/item_types.h"
 #include "platform/text.h"
 #include "tests/support/temp_folder.h"
 
@@ -74,8 +75,8 @@ TEST(UnitTable, CodesKeysAndNamesAreUniqueAndUnitsOfAnItemTypeMeasureTheSame) {
   EXPECT_EQ(used, keys);
   for (const int code : {-1, 0, 998, 100002, 1100187, 2147483647}) EXPECT_EQ(FindItemType(code), nullptr) << code;
   for (const int key : {-1, 1, 999, 1999, 99004, 99014, -2147483647}) EXPECT_EQ(FindUnit(key), nullptr) << key;
-  EXPECT_FALSE(AllowsUnit(Item(kCoordinateItemType), 1400));
-  for (const char* text : {"second", ""}) EXPECT_EQ(FindUnitByText(Item(kCoordinateItemType), text), nullptr);
+  EXPECT_FALSE(AllowsUnit(Item(quantity::kMapCoordinate), 1400));
+  for (const char* text : {"second", ""}) EXPECT_EQ(FindUnitByText(Item(quantity::kMapCoordinate), text), nullptr);
 }
 
 // Result files and templates store these quantities in these units, setups store numbers in the base unit, and some

@@ -28,10 +28,10 @@ constexpr float kMissing = kDeleteValue;
 class Coverage : public testing::Test {
  protected:
   Coverage() {
-    auto& period = *document_.Root().Important<CSimPeriodKvf>("SIMPERIOD");
+    auto& period = *document_.Root().Important(kSimulationPeriod);
     period.SIMSTART = CYbDateTime(2000, 7, 1);
     period.SIMEND = CYbDateTime(2001, 7, 1);
-    auto& domain = *document_.Root().Important<CCatchmentKvf>("CATCHMENT");
+    auto& domain = *document_.Root().Important(kDomain);
     WritePolygons("domain.shp", {{0, 1000}});
     domain.Type = CCatchmentKvf::kShapeFile;
     domain.ShapeFile().Choose(FileName("domain.shp", folder_.Path()), {});
@@ -85,7 +85,7 @@ class Coverage : public testing::Test {
 };
 
 TEST_F(Coverage, CountsTheCellsWithoutAValue) {
-  auto& topography = *document_.Root().Important<CTopographyKvf>("TOPOGRAPHY");
+  auto& topography = *document_.Root().Important(kTopography);
   topography.Type = CData2DKvf::kGridFile;
   topography.GridFile().Choose(FileName("dem.nds2", folder_.Path()));
   // Seven columns, and one empty cell in them.
@@ -195,7 +195,7 @@ TEST_F(Coverage, TakesWhatStayedTheSameFromTheBoardBefore) {
   const auto again = Board(first.get());
   EXPECT_EQ(again->domain, first->domain);
   EXPECT_EQ(again->rows.size(), first->rows.size());
-  document_.Root().Important<CSimPeriodKvf>("SIMPERIOD")->SIMEND = CYbDateTime(2003, 1, 1);
+  document_.Root().Important(kSimulationPeriod)->SIMEND = CYbDateTime(2003, 1, 1);
   EXPECT_EQ(RowOf(*Board(again.get()), "rain.nds0").TimeText(), "ends 365 days early");
 
   Progress progress;

@@ -32,8 +32,8 @@ class Data2D : public testing::Test {
 
   test::TempFolder folder;
   CFlowModelDoc document;
-  CCatchmentKvf& domain = *document.Root().Important<CCatchmentKvf>("CATCHMENT");
-  CTopographyKvf& ground = *document.Root().Important<CTopographyKvf>("TOPOGRAPHY");
+  CCatchmentKvf& domain = *document.Root().Important(kDomain);
+  CData2DKvf& ground = *document.Root().Important(kTopography);
 };
 
 TEST_F(Data2D, AGridIsBuiltAnewWhenWhatDecidesItHasChangedAndOnlyThen) {
@@ -114,8 +114,8 @@ TEST_F(Data2D, OldSetupsWereInterpolatedBilinearlyAndOnlySomeQuantitiesKnowTheGr
     EXPECT_EQ(test::ValueOf(opened, "Topography:RelativeToGround"), "");
     EXPECT_EQ(opened.Report().unread.size(), 1U);
   }
-  document.Root().Important<CModelCompKvf>("MODELCOMP")->SZ = 0;
-  CDummySatZoneKvf& table = *document.Root().Child<CDummySatZoneKvf>();
+  document.Root().Important(kModelComponents)->SZ = 0;
+  auto& table = dynamic_cast<CData2DKvf&>(*FindNode(document.Root(), {{"GroundwaterTable", 1}}));
   EXPECT_EQ(table.GetItemType(), 100364);
   table.Type = CData2DKvf::kGridFile;
   table.GridFile().Choose(FileName("dem.nds2", folder.Path()));

@@ -6,6 +6,8 @@
 
 #include <gmock/gmock.h>
 
+#include "platform/item_types.h"
+
 namespace tervane {
 namespace {
 
@@ -13,7 +15,7 @@ namespace {
 CGeoDataBoundCondCatchmentData Domain(std::vector<std::string_view> rows) {
   CGeoDataBoundCondCatchmentData domain;
   const int nx = static_cast<int>(rows.front().size()), ny = static_cast<int>(rows.size());
-  EXPECT_EQ(domain.SetGridData({nx, ny, 1, 0, 0, 0, {}}, 0, -1, 0, kCodeItemType), "");
+  EXPECT_EQ(domain.SetGridData({nx, ny, 1, 0, 0, 0, {}}, 0, -1, 0, quantity::kCode), "");
   float* cells = domain.GetData();
   for (int j = 0; j < ny; ++j)
     for (int i = 0; i < nx; ++i) {

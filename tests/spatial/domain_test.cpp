@@ -4,6 +4,7 @@
 
 #include <gmock/gmock.h>
 
+#include "platform/item_types.h"
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -38,10 +39,10 @@ TEST(Domain, TellsWhatIsWrongWithItsFile) {
     if (c.values.empty()) {
       folder.Write("domain.nds2", "no data file");
     } else {
-      test::WriteGrid(folder.File("domain.nds2"), {2, 1, 100, 0, 0, 0, c.projection}, c.values, kCodeItemType);
+      test::WriteGrid(folder.File("domain.nds2"), {2, 1, 100, 0, 0, 0, c.projection}, c.values, quantity::kCode);
     }
     CFlowModelDoc document;
-    auto& domain = *document.Root().Important<CCatchmentKvf>("CATCHMENT");
+    auto& domain = *document.Root().Important(kDomain);
     domain.GridFile().Choose(FileName("domain.nds2", folder.Path()));
     document.Root().Validate();
     std::string found;
@@ -58,7 +59,7 @@ TEST(Domain, TellsWhatIsWrongWithItsFile) {
 TEST(Domain, AChosenShapeFilePutsTheGridWhereItLies) {
   test::TempFolder folder;
   CFlowModelDoc document;
-  auto& domain = *document.Root().Important<CCatchmentKvf>("CATCHMENT");
+  auto& domain = *document.Root().Important(kDomain);
   domain.nxShp = 11;
   domain.nyShp = 6;
   CTvnShapeData shapes;

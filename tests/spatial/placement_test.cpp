@@ -22,7 +22,7 @@ using testing::HasSubstr;
 class Placement : public testing::Test {
  protected:
   Placement() {
-    CCatchmentKvf& domain = *document_.Root().Important<CCatchmentKvf>("CATCHMENT");
+    CCatchmentKvf& domain = *document_.Root().Important(kDomain);
     WriteSquare("domain.shp", 500'000, 5'000'000, "EPSG:32632");
     domain.Type = CCatchmentKvf::kShapeFile;
     domain.ShapeFile().Choose(FileName("domain.shp", folder_.Path()), {});
@@ -60,7 +60,7 @@ class Placement : public testing::Test {
 };
 
 TEST_F(Placement, OfAShapeFileIsHeldAgainstTheDomain) {
-  CCatchmentKvf& domain = *document_.Root().Important<CCatchmentKvf>("CATCHMENT");
+  CCatchmentKvf& domain = *document_.Root().Important(kDomain);
   const struct {
     const char* projection;
     double x;
@@ -87,7 +87,7 @@ TEST_F(Placement, OfAShapeFileIsHeldAgainstTheDomain) {
 }
 
 TEST_F(Placement, OfAGridFileIsHeldAgainstTheDomain) {
-  auto& topography = *document_.Root().Important<CTopographyKvf>("TOPOGRAPHY");
+  auto& topography = *document_.Root().Important(kTopography);
   topography.Type = CData2DKvf::kGridFile;
   topography.GridFile().Choose(FileName("dem.nds2", folder_.Path()));
   WriteGrid("dem.nds2", 500'000, 5'000'000, 100, "EPSG:32632");

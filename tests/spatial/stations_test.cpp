@@ -7,6 +7,7 @@
 #include <fmt/ranges.h>
 #include <gmock/gmock.h>
 
+#include "surface/climate.h"
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -47,7 +48,7 @@ class Stations : public testing::Test {
 
   test::TempFolder folder;
   CFlowModelDoc document;
-  Forcing& forcing = *document.Root().Important<Forcing>("PRECIPITATION");
+  Forcing& forcing = *document.Root().Important(kPrecipitation);
 };
 
 TEST_F(Stations, FollowTheCodesOfTheGridOrTheValuesOfThePolygons) {
@@ -172,7 +173,7 @@ TEST_F(Stations, OfACountThatTheFileDoesNotHoldAreAtTheirDefaults) {
                                         "section STATION_BASED {\nNO_TIMESERIES = ") +
                                 c.count + "\n}\n}\n}"),
         "a.tvd"));
-    const auto& read = *opened.Root().Important<Forcing>("PRECIPITATION");
+    const auto& read = *opened.Root().Important(kPrecipitation);
     EXPECT_EQ(ZoneItems(read).size(), c.stations);
     EXPECT_EQ(opened.Report().entries.size(), c.notes);
     for (const CFMSEKvfGroupBase* station : ZoneItems(read)) EXPECT_EQ(station->GetStationName(), "Undefined");

@@ -5,6 +5,7 @@
 #include <gmock/gmock.h>
 
 #include "data/grid_files.h"
+#include "platform/item_types.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -20,7 +21,7 @@ class Zones : public testing::Test {
   void WriteCodes(std::vector<float> codes) {
     CTvn2DOrthoRotatedGridData grid;
     const int nx = static_cast<int>(codes.size());
-    ASSERT_EQ(grid.TakeValues({nx, 1, 100, 0, 0, 0, {}}, std::move(codes), kUsualDeleteValue, 0, kCodeItemType), "");
+    ASSERT_EQ(grid.TakeValues({nx, 1, 100, 0, 0, 0, {}}, std::move(codes), kUsualDeleteValue, 0, quantity::kCode), "");
     const FileResult result = WriteGridData(folder.File("codes.nds2"), grid);
     ASSERT_TRUE(result.Ok()) << result.error;
     zones.GridFile().Choose(FileName("codes.nds2", folder.Path()));
@@ -33,7 +34,7 @@ class Zones : public testing::Test {
 
   test::TempFolder folder;
   CFlowModelDoc document;
-  CSubcatchmentKvf& zones = *document.Root().Important<CSubcatchmentKvf>("SUBCATCHMENT");
+  CSubcatchmentKvf& zones = *document.Root().Important(kSubcatchments);
 };
 
 TEST_F(Zones, FollowTheCodesOfTheirFileAndKeepWhatTheyHold) {

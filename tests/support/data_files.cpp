@@ -5,6 +5,7 @@
 #include <stdexcept>
 
 #include "data/grid_files.h"
+#include "platform/item_types.h"
 
 namespace tervane::test {
 
@@ -24,7 +25,7 @@ void WriteGrid(const std::string& path, const GridGeometry& geometry, std::vecto
 
 void WriteCodes(const std::string& path, std::vector<float> codes) {
   const int nx = static_cast<int>(codes.size());
-  WriteGrid(path, {nx, 1, 100, 0, 0, 0, {}}, std::move(codes), kCodeItemType);
+  WriteGrid(path, {nx, 1, 100, 0, 0, 0, {}}, std::move(codes), quantity::kCode);
 }
 
 void WriteShapes(const std::string& path, ShapeKind kind, AttributeKind attribute,

@@ -11,6 +11,7 @@
 
 #include "data/datafile_writer.h"
 #include "geometry/shapes.h"
+#include "platform/item_types.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane::test {
@@ -53,7 +54,7 @@ void WriteGrids(const std::string& path) {
   NewDataFile content;
   content.geometry = Geometry(1);
   content.hasTime = false;
-  content.items = {{"Model domain", kCodeItemType, kWholeNumberUnit}, {"Topography", 100180, 1000}};
+  content.items = {{"Model domain", quantity::kCode, kWholeNumberUnit}, {"Topography", 100180, 1000}};
   DataFileWriter writer;
   Require(writer.Create(path, content));
   Require(writer.Put(1, Cells([](double u, double v) { return u * u + v * v < 0.88 ? 1 : 2; })));

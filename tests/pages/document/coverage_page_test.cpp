@@ -21,7 +21,7 @@ class CoveragePage : public testing::Test {
  protected:
   CoveragePage() {
     EXPECT_TRUE(document_.OnOpenDocument(TERVANE_SOURCE_DIR "/examples/rhone/rhone_xyz.tvd")) << document_.Error();
-    auto& topography = *document_.Root().Important<CTopographyKvf>("TOPOGRAPHY");
+    auto& topography = *document_.Root().Important(kTopography);
     topography.InterpMethod = 3;
     topography.SearchRadius = 400;
     page_ = MakePage(kCoveragePage, *document_.Root().GetImportantNode("COVERAGE"), Context());
@@ -85,7 +85,7 @@ TEST_F(CoveragePage, ShowsTheYearsOfAForcing) {
 }
 
 TEST_F(CoveragePage, FollowsTheSetup) {
-  document_.Root().Important<CTopographyKvf>("TOPOGRAPHY")->XyzFile().File = FileName("missing.txt", "/nowhere");
+  document_.Root().Important(kTopography)->XyzFile().File = FileName("missing.txt", "/nowhere");
   document_.Root().Validate();
   EXPECT_THAT(FormText(page_->Form()), HasSubstr("/nowhere/missing.txt: it does not exist"));
 }

@@ -4,6 +4,7 @@
 
 #include <gmock/gmock.h>
 
+#include "surface/climate.h"
 #include "tests/support/data_files.h"
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
@@ -18,7 +19,7 @@ TEST(StationPage, AFileOfAreasMakesTheStationsAndTheNameThatFillsGapsIsOneOfThem
   test::WriteShapes(folder.File("areas.shp"), ShapeKind::Polygon, AttributeKind::Text, {"Sion", "Brig"});
   test::WriteCodes(folder.File("codes.nds2"), {4, 2});
   CFlowModelDoc document;
-  auto& forcing = *document.Root().Important<C2DStationBasedDataKvf>("PRECIPITATION");
+  auto& forcing = *document.Root().Important(kPrecipitation);
   test::PageDriver page(document, "Climate/PrecipitationRate");
   page.Enter("Spatial Distribution:", "1");
   page.Enter("Data Type:", "1");

@@ -4,7 +4,9 @@
 
 #include <gmock/gmock.h>
 
+#include "platform/item_types.h"
 #include "simspec/model_components.h"
+#include "spatial/zones.h"
 #include "tests/support/data_files.h"
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
@@ -28,11 +30,11 @@ class ZonePage : public testing::Test {
 
   test::TempFolder folder;
   CFlowModelDoc document;
-  CSubcatchmentKvf& zones = *document.Root().Important<CSubcatchmentKvf>("SUBCATCHMENT");
+  CSubcatchmentKvf& zones = *document.Root().Important(kSubcatchments);
 };
 
 TEST_F(ZonePage, ASelectorTakesCodesAndRefusesOtherQuantitiesWithTheReason) {
-  WriteGrid("codes.nds2", {1, 2}, kCodeItemType);
+  WriteGrid("codes.nds2", {1, 2}, quantity::kCode);
   WriteGrid("dem.nds2", {1, 2}, 100180);
   test::PageDriver page(document, "Subcatchments");
   page.Outside().Expect("", Path(folder.File("dem.nds2")));
@@ -56,8 +58,8 @@ TEST_F(ZonePage, ASelectorTakesCodesAndRefusesOtherQuantitiesWithTheReason) {
 }
 
 TEST_F(ZonePage, ZonesThatHoldWorkGoOnlyWhenTheUserSaysSo) {
-  WriteGrid("codes.nds2", {1, 2}, kCodeItemType);
-  WriteGrid("others.nds2", {2, 3}, kCodeItemType);
+  WriteGrid("codes.nds2", {1, 2}, quantity::kCode);
+  WriteGrid("others.nds2", {2, 3}, quantity::kCode);
   test::PageDriver page(document, "Subcatchments");
   ASSERT_EQ(page.Enter("Grid Distribution File:", folder.File("codes.nds2")), "");
   zones.SelectZoneByCode(1)->SetStationName("Upper valley");

@@ -6,6 +6,7 @@
 
 #include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
+#include "surface/climate.h"
 #include "tests/support/page_driver.h"
 
 namespace tervane {
@@ -17,7 +18,7 @@ class ClimatePages : public testing::Test {
   static bool IsShown(test::PageDriver& page, const char* label) { return page.Find(label).IsShown(); }
 
   CFlowModelDoc document;
-  CPrecipitationRelatedKvf& climate = *document.Root().Important<CPrecipitationRelatedKvf>("PRECIPITATIONRELATED");
+  CPrecipitationRelatedKvf& climate = *document.Root().Important(kClimate);
 };
 
 TEST_F(ClimatePages, ASwitchThatGoesOffTakesThoseWithItThatDependOnIt) {
@@ -46,8 +47,8 @@ TEST_F(ClimatePages, ASwitchThatGoesOffTakesThoseWithItThatDependOnIt) {
 }
 
 TEST_F(ClimatePages, TheEngineDecidesWhichGroupsAreThere) {
-  auto& engine = document.Root().Important<CBasicParaKvf>("BASICPARAMETERS")->ModelType;
-  auto& recharge = document.Root().Important<CModModelCompKvf>("MODMODELCOMP")->Recharge_ModelType;
+  auto& engine = document.Root().Important(kBasicParameters)->ModelType;
+  auto& recharge = document.Root().Important(kModflowComponents)->Recharge_ModelType;
   for (const auto& [model, type, snow, rechargeOptions, ponding] : {std::tuple{0, 0, true, false, false},
                                                                     {1, 0, false, true, false},
                                                                     {1, 1, false, true, true},

@@ -40,7 +40,7 @@ TEST(DataViewer, EditShowsTheFileInATabThatFollowsItAndClosesByItself) {
   OpenedSetup setup;
   const std::string path = setup.Folder().File("dem.nds2");
   WriteDays(path, 10);
-  auto* topography = setup.Session().Document().Root().Important<CTopographyKvf>("TOPOGRAPHY");
+  auto* topography = setup.Session().Document().Root().Important(kTopography);
   ASSERT_TRUE(topography);
   topography->Type = CData2DKvf::kGridFile;
   topography->GridFile().Choose(FileName(path, {}));

@@ -145,7 +145,7 @@ TEST(Background, ADialogWaitsForWhatTheUserHasAskedFor) {
 TEST(Background, APageShowsTheGridThatIsComputedInTheForeground) {
   OpenedSetup setup;
   setup.Folder().Write("points.txt", "100 100 10\n900 200 20\n500 800 35\n");
-  auto* topography = setup.Session().Document().Root().Important<CTopographyKvf>("TOPOGRAPHY");
+  auto* topography = setup.Session().Document().Root().Important(kTopography);
   ASSERT_TRUE(topography);
   topography->Type = CData2DKvf::kXyzFile;
   topography->XyzFile().File = FileName(setup.Folder().File("points.txt"), {});

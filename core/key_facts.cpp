@@ -1,0 +1,41 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "core/key_facts.h"
+
+#include <cmath>
+
+#include <fmt/format.h>
+
+#include "platform/text.h"
+
+namespace tervane {
+
+std::string_view TextOf(KeyChoices choices, int value) {
+  for (const KeyChoice& choice : choices)
+    if (choice.value == value) return choice.text;
+  return {};
+}
+
+std::string KeyFacts::RangeText() const {
+  if (!HasRange()) return {};
+  if (!HasGreatest()) return fmt::format("{} or more", ShortestNumber(least));
+  if (least == -std::numeric_limits<double>::infinity()) return fmt::format("at most {}", ShortestNumber(greatest));
+  return fmt::format("{} to {}", ShortestNumber(least), ShortestNumber(greatest));
+}
+
+std::string WhyStray(const KeyFacts& facts, double value) {
+  if (!std::isfinite(value)) return fmt::format("The value {} is no finite number.", value);
+  // Limits are decimal numbers, values may have single precision.
+  const double slack = 1e-6 * std::abs(value);
+  if (value < facts.least - slack || value > facts.greatest + slack)
+    return fmt::format("The value {} is outside its range: {}.", fmt::format("{:.7g}", value), facts.RangeText());
+  if (facts.choices.empty()) return {};
+  std::string texts;
+  for (const KeyChoice& choice : facts.choices) {
+    if (static_cast<double>(choice.value) == value) return {};
+    texts += fmt::format("{}{} ({})", texts.empty() ? "" : ", ", choice.value, choice.text);
+  }
+  return fmt::format("The value {} is none of its choices: {}.", fmt::format("{:.7g}", value), texts);
+}
+
+}  // namespace tervane
