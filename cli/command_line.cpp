@@ -72,6 +72,11 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
                             [&] { return ShowCommand(typed.file, typed.path, streams); })),
            "The node; without it the whole setup");
 
+  CLI::App* why = withFile(command("why", "Tell why a node takes part or not",
+                                   [&] { return WhyCommand(typed.file, typed.path, typed.json, streams); }));
+  withPath(why, "The node; without it all that is missing, and what would bring it");
+  why->add_flag("--json", typed.json, "As JSON");
+
   withPath(withFile(command("page", "Show the page of a node as text, control by control",
                             [&] { return PageCommand(typed.file, typed.path, streams); })),
            "The node")

@@ -36,6 +36,9 @@ enum class TreeForm { Text, Paths, Json };
 int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams);
 int ShowCommand(const std::string& file, const std::string& path, Streams streams);
 
+/// Why a node takes part or not; without a place all that is missing, and what would bring it.
+int WhyCommand(const std::string& file, const std::string& path, bool json, Streams streams);
+
 /// The page of a node as text.
 int PageCommand(const std::string& file, const std::string& path, Streams streams);
 

@@ -13,6 +13,8 @@
 
 #include "core/doc_version.h"
 #include "core/path.h"
+#include "document/coverage_board.h"
+#include "document/overview.h"
 #include "document/view_settings.h"
 #include "forms/page.h"
 #include "pages/findings.h"
@@ -27,6 +29,7 @@
 #include "shell/run/document_run.h"
 #include "shell/run/log_view.h"
 #include "shell/run/run_panel.h"
+#include "shell/why_dialog.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -92,6 +95,7 @@ void DocumentFrame::BuildBody() {
     treeTabs_->addTab(made, title);
     trees_.push_back(made);
     connect(made, &NodeTree::NodeChosen, this, [this](quint64 serial) { GoTo(serial); });
+    connect(made, &NodeTree::WhyAsked, this, &DocumentFrame::ShowWhyHere);
   };
   trees_.clear();
   tree(kSetupDataTree, tr("Setup Data"), tr("No part of the setup takes part."));
@@ -223,6 +227,10 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
     page_->deleteLater();
   }
   page_ = new PageView(std::move(made), ToQt(PathOf(node)));
+  connect(page_, &PageView::WhyAsked, this, [this](const Control* control) {
+    ShowWhy(tr("Why Is This Grey?"), {WhyEnabled(session_->Document(), page_->Page().Form(), *control)},
+            tr("can be changed, since"), tr("cannot be changed, since"));
+  });
   connect(page_, &PageView::UnitChosen, this, [this](int itemType, int unit) {
     program_.ChooseUnit(itemType, unit);
     page_->Sync();
@@ -270,6 +278,25 @@ void DocumentFrame::Go(int by) {
   emit StateChanged();
 }
 
+void DocumentFrame::ShowWhy(const QString& title, const std::vector<Explanation>& explanations, const QString& yes,
+                            const QString& no) {
+  WhyDialog dialog(title, explanations, yes, no, this);
+  connect(&dialog, &WhyDialog::Chosen, this, [this](quint64 serial, const QString& key) { GoTo(serial, FromQt(key)); });
+  dialog.exec();
+}
+
+void DocumentFrame::ShowWhyHere(quint64 serial) {
+  if (CYbSEKvfBase* node = NodeOf(serial))
+    ShowWhy(tr("Why Is This Here?"), {WhyTakesPart(session_->Document(), *node)}, tr("takes part, since"),
+            tr("takes no part, since"));
+}
+
+void DocumentFrame::ShowWhatIsMissing() {
+  std::vector<Explanation> explanations;
+  for (MissingNode& missing : WhatIsMissing(session_->Document())) explanations.push_back(std::move(missing.why));
+  ShowWhy(tr("What Is Missing?"), explanations, tr("takes part, since"), tr("takes no part. To bring it:"));
+}
+
 std::string DocumentFrame::CurrentPath() const {
   const CYbSEKvfBase* node = NodeOf(current_);
   return node ? PathOf(*node) : std::string();
@@ -279,8 +306,8 @@ void DocumentFrame::LeaveGoneNode() {
   if (!current_ || SelectInTrees(current_)) return;
   // Some pages stand in no tree and are reached by a command alone.
   CYbSEKvfBase* node = NodeOf(current_);
-  for (const char* name : {"OVERVIEW", "COVERAGE"})
-    if (node && session_->Document().Root().GetImportantNode(name) == node) return;
+  const CYbSEKvfBase& root = session_->Document().Root();
+  if (node && (node == root.Important(kOverview) || node == root.Important(kCoverage))) return;
   for (const std::uint64_t serial : std::vector(above_))
     if (trees_.front()->Select(serial) && GoTo(serial)) return;
   if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));
@@ -311,7 +338,7 @@ void DocumentFrame::FocusNextPane() {
 void DocumentFrame::RebuildProcessedData() {
   CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
   if (!report) return;
-  auto* processed = session_->Document().Root().Important<CProcDataKvf>("PROCESSED_DATA");
+  auto* processed = session_->Document().Root().Important(kProcessedData);
   const CYbSEKvfBase* shown = NodeOf(current_);
   const bool isShown = shown == processed || (shown && NodeBelow(*processed, current_));
   std::string place;
@@ -357,7 +384,7 @@ void DocumentFrame::TellProcessedData() {
 
 void DocumentFrame::Refresh(int hint) {
   CGlobal& root = session_->Document().Global();
-  const auto* settings = root.Important<CViewSettingsKvf>("VIEWSETTINGS");
+  const auto* settings = root.Important(kViewSettings);
   for (NodeTree* tree : trees_) tree->Sync(root, !settings || settings->ShowValidationIcons != 0);
   ShowFindings();
   if (page_) LeaveGoneNode();

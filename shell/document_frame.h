@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "document/edit_session.h"
+#include "pages/why.h"
 #include "shell/widgets/banner.h"
 
 class QSplitter;
@@ -57,6 +58,8 @@ class DocumentFrame : public QWidget {
   void StartFind();
   /// The page's own help; false when it has none.
   bool OnHelp();
+  /// What takes no part, and what would bring it.
+  void ShowWhatIsMissing();
   void StepFinding(int by);
   /// Puts the keyboard into the next of: tree, page, findings.
   void FocusNextPane();
@@ -100,6 +103,9 @@ class DocumentFrame : public QWidget {
 
  private:
   void BuildBody();
+  void ShowWhyHere(quint64 serial);
+  void ShowWhy(const QString& title, const std::vector<Explanation>& explanations, const QString& yes,
+               const QString& no);
   void Refresh(int hint);
   void ShowPage(CYbSEKvfBase& node, const std::string& control);
   /// Looks whether the preprocessor's report is another one.

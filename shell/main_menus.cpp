@@ -15,8 +15,10 @@
 #include <QTabWidget>
 #include <QToolBar>
 
+#include "document/coverage_board.h"
 #include "document/edit_session.h"
 #include "document/module.h"
+#include "document/overview.h"
 #include "document/view_settings.h"
 #include "execution/engine_search.h"
 #include "execution/execute_flags.h"
@@ -36,20 +38,21 @@ namespace tervane {
 namespace {
 
 CExecuteEngineFlagsKvf& FlagsOf(const DocumentFrame& frame) {
-  return *frame.Session().Document().Root().Important<CExecuteEngineFlagsKvf>("EXECUTE_ENGINE_FLAGS");
+  return *frame.Session().Document().Root().Important(kExecuteFlags);
 }
 
 CViewSettingsKvf& ViewSettingsOf(const DocumentFrame& frame) {
-  return *frame.Session().Document().Root().Important<CViewSettingsKvf>("VIEWSETTINGS");
+  return *frame.Session().Document().Root().Important(kViewSettings);
 }
 
 /// Shows the page of a node that stands in no tree.
-void GoToImportant(DocumentFrame& frame, const char* name) {
-  if (const CYbSEKvfBase* node = frame.Session().Document().Root().GetImportantNode(name)) frame.GoTo(node->Serial());
+template <class Node>
+void GoToImportant(DocumentFrame& frame, ImportantName<Node> name) {
+  if (const Node* node = frame.Session().Document().Root().Important(name)) frame.GoTo(node->Serial());
 }
 
 bool HasWaterQuality(const DocumentFrame& frame) {
-  const auto* components = frame.Session().Document().Root().Important<CModelCompKvf>("MODELCOMP");
+  const auto* components = frame.Session().Document().Root().Important(kModelComponents);
   return components && components->WQ != 0;
 }
 
@@ -109,7 +112,9 @@ void MainWindow::BuildMenus() {
   BuildRunMenu();
   QMenu* tools = menuBar()->addMenu(tr("&Tools"));
   AddForDocument(tools, tr("Data &Coverage"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_D),
-                 [](DocumentFrame& frame) { GoToImportant(frame, "COVERAGE"); });
+                 [](DocumentFrame& frame) { GoToImportant(frame, kCoverage); });
+  AddForDocument(tools, tr("What Is &Missing?"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_M),
+                 [](DocumentFrame& frame) { frame.ShowWhatIsMissing(); });
   windowMenu_ = menuBar()->addMenu(tr("&Window"));
   connect(windowMenu_, &QMenu::aboutToShow, this, &MainWindow::FillWindowMenu);
   // Filled when it is opened; the keys work without that.
@@ -177,7 +182,7 @@ void MainWindow::BuildViewMenu() {
                                     [](DocumentFrame& frame) { frame.Go(1); });
   forward.enabled = [this] { return Frame() && Frame()->CanGo(1); };
   AddForDocument(view, tr("&Overview"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_I),
-                 [](DocumentFrame& frame) { GoToImportant(frame, "OVERVIEW"); });
+                 [](DocumentFrame& frame) { GoToImportant(frame, kOverview); });
   view->addSeparator();
   AddForDocument(view, tr("Next F&inding"), nullptr, QKeySequence(Qt::Key_F8),
                  [](DocumentFrame& frame) { frame.StepFinding(1); });

@@ -154,6 +154,8 @@ void NodeTree::contextMenuEvent(QContextMenuEvent* event) {
   if (const QTreeWidgetItem* item = itemAt(event->pos())) {
     menu.addAction(tr("&Copy Path"), this,
                    [item] { QApplication::clipboard()->setText(item->data(0, kPathRole).toString()); });
+    menu.addAction(tr("&Why Is This Here?"), this,
+                   [this, item] { emit WhyAsked(item->data(0, kSerialRole).toULongLong()); });
     menu.addSeparator();
   }
   menu.addAction(tr("&Expand All"), this, &QTreeWidget::expandAll);

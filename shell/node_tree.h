@@ -25,6 +25,8 @@ class NodeTree : public QTreeWidget {
 
  signals:
   void NodeChosen(quint64 serial);
+  /// The user asks why a node takes part.
+  void WhyAsked(quint64 serial);
 
  protected:
   void paintEvent(QPaintEvent* event) override;

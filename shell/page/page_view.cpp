@@ -2,9 +2,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/page/page_view.h"
 
+#include <QContextMenuEvent>
 #include <QGridLayout>
 #include <QGroupBox>
 #include <QLabel>
+#include <QMenu>
 #include <QScrollArea>
 #include <QSplitter>
 #include <QStyle>
@@ -352,6 +354,23 @@ void PageView::FocusOn(const std::string& key) {
   if (found == widgets_.end()) return;
   (*found)->FocusTarget()->setFocus(Qt::ShortcutFocusReason);
   scroll_->ensureWidgetVisible((*found)->Field());
+}
+
+void PageView::contextMenuEvent(QContextMenuEvent* event) {
+  // What is disabled hands its events on to the page.
+  for (const auto& widget : widgets_) {
+    const Control& control = widget->Described();
+    if (control.IsEnabled() || control.enabledWhen.IsAlways()) continue;
+    const auto isHit = [&](const QWidget* part) {
+      return part && part->isVisible() && part->rect().contains(part->mapFromGlobal(event->globalPos()));
+    };
+    if (!isHit(widget->Label()) && !isHit(widget->Field())) continue;
+    QMenu menu;
+    menu.addAction(tr("&Why Is This Grey?"), this, [this, &control] { emit WhyAsked(&control); });
+    menu.exec(event->globalPos());
+    return;
+  }
+  QWidget::contextMenuEvent(event);
 }
 
 }  // namespace tervane

@@ -42,9 +42,12 @@ class PageView : public QWidget {
 
  signals:
   void UnitChosen(int itemType, int unit);
+  /// The user asks why a control cannot be changed.
+  void WhyAsked(const Control* control);
 
  protected:
   void resizeEvent(QResizeEvent* event) override;
+  void contextMenuEvent(QContextMenuEvent* event) override;
 
  private:
   struct Form;  ///< A grid of one form, group or sub-form.

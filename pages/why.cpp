@@ -1,0 +1,183 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/why.h"
+
+#include <algorithm>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include "core/path.h"
+#include "forms/page.h"
+#include "pages/tree_entries.h"
+#include "platform/text.h"
+
+namespace tervane {
+
+namespace {
+
+std::string_view WithoutColon(std::string_view label) {
+  label = Trimmed(label);
+  if (label.ends_with(':')) label.remove_suffix(1);
+  return Trimmed(label);
+}
+
+const std::string& TitleOf(const CYbSEKvfBase& node) {
+  return node.GetAbbreviatedTitle().empty() ? node.GetTitle() : node.GetAbbreviatedTitle();
+}
+
+/// What a control is called: by its label, without one by that of the control in front of it in its row.
+class Labels {
+ public:
+  void Look(PageForm& form) {
+    form.ForEach([this](const Control& control) {
+      const std::string_view own = WithoutColon(control.label);
+      if (!own.empty()) before_ = own;
+      if (control.key.empty() || !control.node) return;
+      // A choice without a label belongs to what stands in front of it in its row.
+      const std::string label = !own.empty()     ? std::string(own)
+                                : control.beside ? fmt::format("The method of {}", before_)
+                                                 : "The value of this choice";
+      labels_.push_back({control.node, control.key, label});
+    });
+  }
+  std::string Find(const CYbSEKvfBase& node, const std::string& key) const {
+    for (const auto& known : labels_)
+      if (known.node == &node && known.key == key && !known.label.empty()) return Replaced(known.label, "\n", " ");
+    return key;
+  }
+
+ private:
+  struct Known {
+    const CYbSEKvfBase* node;
+    std::string key, label;
+  };
+  std::vector<Known> labels_;
+  std::string before_;
+};
+
+/// Puts facts into words, each with the page that has its control.
+class Explainer {
+ public:
+  explicit Explainer(CYbSEDocument& document) : document_(document) {}
+
+  /// `keys` know the members of the asking page; null elsewhere.
+  Reason InWords(const ConditionFact& fact, const CYbSEKvfBase& asker, BoundKeys* keys = nullptr) {
+    Reason reason;
+    reason.holds = fact.holds;
+    if (!fact.sentence.empty() || !fact.member) {
+      const char* must = fact.holds ? "" : "must be so: ";
+      const char* negated = fact.isNegated ? (fact.holds ? "it is not so that " : "must not be so: ") : must;
+      reason.text = fmt::format("{}{}", fact.isNegated ? negated : must, fact.sentence);
+      return reason;
+    }
+    BoundKeys own;
+    if (!keys) keys = &own;
+    keys->Add(fact.node ? *fact.node : asker);
+    const BoundKeys::Place* place = keys->Find(fact.member);
+    if (!place) {
+      reason.text = fact.holds ? "a value of this page is as it must be" : "a value of this page must be another";
+      return reason;
+    }
+    reason.path = PathOf(*place->node);
+    reason.key = place->key;
+    CYbSEKvfBase* shown = PageNodeOf(*place->node, reason);
+    const std::string label = shown ? LabelOf(*shown, *place->node, place->key) : place->key;
+    reason.text = fmt::format("{} {}", label, Demand(fact, place->facts));
+    return reason;
+  }
+
+ private:
+  static std::string Demand(const ConditionFact& fact, const KeyFacts& facts) {
+    const char* verb = fact.holds ? "is" : "must be";
+    if (fact.isFlag) return fmt::format("{} {}", verb, fact.isNegated ? "off" : "on");
+    std::vector<std::string> values;
+    for (const int value : fact.values) {
+      const std::string_view text = TextOf(facts.choices, value);
+      values.push_back(text.empty() ? std::to_string(value) : std::string(text));
+    }
+    return fmt::format("{}{} {}", verb, fact.isNegated ? " not" : "", fmt::join(values, " or "));
+  }
+
+  /// The nearest node from here up whose page is shown.
+  CYbSEKvfBase* PageNodeOf(const CYbSEKvfBase& node, Reason& reason) const {
+    for (CYbSEKvfBase* shown = FindNode(document_.Root(), ParseSetupPath(PathOf(node)).steps);
+         shown && shown->GetParent(); shown = shown->GetParent()) {
+      if (!PageClassOf(*shown)) continue;
+      reason.page = TitleOf(*shown);
+      reason.serial = shown->Serial();
+      return shown;
+    }
+    return nullptr;
+  }
+
+  std::string LabelOf(CYbSEKvfBase& shown, const CYbSEKvfBase& node, const std::string& key) {
+    auto found = labels_.find(&shown);
+    if (found == labels_.end()) {
+      found = labels_.emplace(&shown, Labels()).first;
+      const auto page = MakePageToRead(*PageClassOf(shown), shown, {document_, host_, {}});
+      if (page) found->second.Look(page->Form());
+    }
+    return found->second.Find(node, key);
+  }
+
+  CYbSEDocument& document_;
+  NobodyToAsk host_;
+  std::unordered_map<const CYbSEKvfBase*, Labels> labels_;
+};
+
+void Explain(Explainer& explainer, CYbSEKvfBase& node, Explanation& why) {
+  const bool takesPart = node.IsDlgUsedInSetup() != 0;
+  for (const ConditionFact& fact : node.TakesPartRule().Why(node)) {
+    Reason reason = explainer.InWords(fact, node);
+    const bool isNew = std::ranges::none_of(why.reasons, [&](const Reason& told) { return told.text == reason.text; });
+    if (isNew && reason.holds == takesPart) why.reasons.push_back(std::move(reason));
+  }
+}
+
+}  // namespace
+
+std::string Explanation::Text(std::string_view yes, std::string_view no) const {
+  std::string text = fmt::format("{} {}{}", subject, holds ? yes : no, reasons.empty() ? "." : ":");
+  for (const Reason& reason : reasons) text += fmt::format("\n{}", reason.text);
+  return text;
+}
+
+Explanation WhyTakesPart(CYbSEDocument& document, CYbSEKvfBase& node) {
+  Explainer explainer(document);
+  Explanation why{TitleOf(node), node.IsDataUsedInSetup() != 0, {}};
+  // Of a node that takes part all rules count, of one that does not those that say no.
+  for (CYbSEKvfBase* above = &node; above && above->GetParent(); above = above->GetParent())
+    if (why.holds || !above->IsDlgUsedInSetup()) Explain(explainer, *above, why);
+  return why;
+}
+
+Explanation WhyEnabled(CYbSEDocument& document, PageForm& form, const Control& control) {
+  Explainer explainer(document);
+  Explanation why{std::string(WithoutColon(Replaced(control.label.empty() ? control.key : control.label, "\n", " "))),
+                  control.IsEnabled(),
+                  {}};
+  for (const ConditionFact& fact : control.enabledWhen.Why(*control.node))
+    why.reasons.push_back(explainer.InWords(fact, form.Node(), &form.Keys()));
+  return why;
+}
+
+std::vector<MissingNode> WhatIsMissing(CYbSEDocument& document) {
+  Explainer explainer(document);
+  std::vector<MissingNode> missing;
+  // Below a node that takes no part nothing does: its own line says enough.
+  std::vector<std::string> above;
+  WalkNodes(document.Root(), [&](const NodePlace& place) {
+    if (place.takesPart || !place.node.HoldsSetup() || !PageClassOf(place.node)) return;
+    const bool isBelow =
+        std::ranges::any_of(above, [&](const std::string& path) { return place.path.starts_with(path + "/"); });
+    if (isBelow) return;
+    above.push_back(place.path);
+    MissingNode node{place.path, place.node.Serial(), {TitleOf(place.node), false, {}}};
+    Explain(explainer, place.node, node.why);
+    if (!node.why.reasons.empty()) missing.push_back(std::move(node));
+  });
+  return missing;
+}
+
+}  // namespace tervane
