@@ -250,11 +250,11 @@ std::optional<double> BilinearValue(const std::array<Neighbour, 4>& points) {
     size += std::abs(weights[k]);
     value += weights[k] * points[k].z;
   }
+  double least = 0;
+  for (const double weight : weights) least = std::min(least, std::copysign(1.0, sum) * weight);
   constexpr double kRounding = 1e-12;
-  if (!(std::abs(sum) > kRounding * size) || size < kRounding * scale * scale) return std::nullopt;
-  const double leastWeight = -kRounding * std::abs(sum);
-  for (const double weight : weights)
-    if (std::copysign(1.0, sum) * weight < leastWeight) return std::nullopt;
+  const bool isSurface = std::abs(sum) > kRounding * size && size >= kRounding * scale * scale;
+  if (!isSurface || least < -kRounding * std::abs(sum)) return std::nullopt;
   return value / sum;
 }
 

@@ -8,7 +8,7 @@
 namespace tervane {
 
 QuadrantNeighbours::QuadrantNeighbours(const std::vector<ScatteredPoint>& points, int nx, double radius)
-    : points_(points), nx_(nx), radius_(radius), following_(points.size()) {}
+    : points_(points), nx_(nx), radius_(radius), entered_(points.size()) {}
 
 void QuadrantNeighbours::Find(int begin, int end, ProgressPart progress) {
   begin_ = begin;
@@ -24,21 +24,15 @@ std::size_t QuadrantNeighbours::Place(std::size_t quadrant, int j) const {
   return row * static_cast<std::size_t>(nx_);
 }
 
-/// Along the row in the direction in which the quadrant opens. A difference of two is the same to the last bit.
-double QuadrantNeighbours::XOf(std::uint32_t point, const View& view) const {
-  const double x = points_[point].x;
-  return view.isLeft ? -x : x;
-}
-
-/// The last of the columns, counted in the direction in which the quadrant opens, that has the point in it; below 0
+/// The last of the columns, counted in the direction in which the quadrant opens, that has a point at x in it; below 0
 /// for none.
-double QuadrantNeighbours::LastColumn(std::uint32_t point, const View& view) const {
-  const double x = XOf(point, view), whole = std::floor(x);
+double QuadrantNeighbours::LastColumn(double x, const View& view) const {
+  const double whole = std::floor(x);
   const bool isPast = view.hasVertical ? whole + 0.5 <= x : whole + 0.5 < x;
   return std::min((isPast ? whole : whole - 1) + (view.isLeft ? nx_ : 0), nx_ - 1.0);
 }
 
-/// Goes through the rows towards the points' side's end, so that points only ever come in.
+/// Goes through the rows away from the side on which the quadrant lies, so that points come in and none leaves.
 void QuadrantNeighbours::Sweep(const View& view, ProgressPart progress) {
   firstOfColumn_.assign(static_cast<std::size_t>(nx_), NoPoint());
   const auto isBelow = [](const ScatteredPoint& point, double limit) { return point.y < limit; };
@@ -66,13 +60,14 @@ void QuadrantNeighbours::Sweep(const View& view, ProgressPart progress) {
 }
 
 void QuadrantNeighbours::Enter(std::uint32_t point, const View& view) {
-  const double x = XOf(point, view);
-  const double column = LastColumn(point, view);
+  // Turned by its sign alone, so that differences stay the same to the last bit.
+  const double x = view.isLeft ? -points_[point].x : points_[point].x;
+  const double column = LastColumn(x, view);
   if (column < 0) return;
   // It is nearer than all that came earlier and lie as far along x or farther, also for all rows that follow.
   std::uint32_t& first = firstOfColumn_[static_cast<std::size_t>(column)];
-  while (first != NoPoint() && XOf(first, view) >= x) first = following_[first];
-  following_[point] = first;
+  while (first != NoPoint() && entered_[first].x >= x) first = entered_[first].following;
+  entered_[point] = {x, points_[point].y, first};
   first = point;
 }
 
@@ -83,12 +78,12 @@ void QuadrantNeighbours::Enter(std::uint32_t point, const View& view) {
 void QuadrantNeighbours::FindServed(double y, const View& view) {
   served_.clear();
   const double shift = view.isLeft ? nx_ : 0;
+  const std::uint32_t none = NoPoint();
   for (int column = nx_ - 1; column >= 0; --column) {
-    for (std::uint32_t point = firstOfColumn_[static_cast<std::size_t>(column)]; point != NoPoint();
-         point = following_[point]) {
-      const double height = points_[point].y - y, height2 = height * height;
+    std::uint32_t point = firstOfColumn_[static_cast<std::size_t>(column)];
+    for (; point != none; point = entered_[point].following) {
+      const double x = entered_[point].x, height = entered_[point].y - y, height2 = height * height;
       if (std::abs(height) > radius_) break;
-      const double x = XOf(point, view);
       int last = column;
       for (; !served_.empty(); served_.pop_back()) {
         const Served& before = served_.back();

@@ -39,6 +39,11 @@ class QuadrantNeighbours {
     /// Whether points straight above or below the centre belong to it; else those straight beside it do.
     bool hasVertical;
   };
+  /// A point that rows have come past, turned like the view.
+  struct Entered {
+    double x, y;
+    std::uint32_t following;
+  };
   /// A point and the columns which it is the nearest to: those from the next one's `last` on up to its own.
   struct Served {
     std::uint32_t point;
@@ -47,8 +52,7 @@ class QuadrantNeighbours {
   };
 
   std::size_t Place(std::size_t quadrant, int j) const;
-  double XOf(std::uint32_t point, const View& view) const;
-  double LastColumn(std::uint32_t point, const View& view) const;
+  double LastColumn(double x, const View& view) const;
   void Sweep(const View& view, ProgressPart progress);
   void Enter(std::uint32_t point, const View& view);
   void FindServed(double y, const View& view);
@@ -59,9 +63,10 @@ class QuadrantNeighbours {
   double radius_;
   int begin_ = 0, end_ = 0;
   std::vector<std::uint32_t> nearest_;
-  /// For each column the points between its centre and the next, and for each point the one behind it. A point comes
-  /// before those that are farther from the row, and only while those are nearer to the column.
-  std::vector<std::uint32_t> firstOfColumn_, following_;
+  /// For each column the first of the points between its centre and the next; the others follow it. A point comes
+  /// before those that are farther from the row, and those only follow while they are nearer to the column.
+  std::vector<std::uint32_t> firstOfColumn_;
+  std::vector<Entered> entered_;
   std::vector<Served> served_;
 };
 
