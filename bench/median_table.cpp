@@ -22,7 +22,10 @@ void MedianTable::Run(int argc, char** argv) {
     const auto found = times_.find(name);
     if (found == times_.end()) continue;
     const auto [least, most] = std::minmax_element(found->second.begin(), found->second.end());
-    fmt::print("{:<44} {:>10.3f} {:>10.3f} {:>10.3f}\n", name, Median(name), *least, *most);
+    fmt::print("{:<44} {:>10.3f} {:>10.3f} {:>10.3f}", name, Median(name), *least, *most);
+    if (const auto limit = timeLimits_.find(name); limit != timeLimits_.end())
+      fmt::print("  limit {:g}  {}", limit->second, Verdict(Median(name), limit->second));
+    fmt::print("\n");
   }
   fmt::print("\n{:<76} {:>7} {:>7}\n", "ratio of medians", "found", "limit");
   for (const RatioLimit& limit : limits_) {

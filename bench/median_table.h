@@ -55,6 +55,9 @@ class MedianTable : public benchmark::BenchmarkReporter {
     limits_.push_back({name, other, limit});
   }
 
+  /// The median of one benchmark is to be at most so many milliseconds.
+  void LimitTime(const std::string& name, double milliseconds) { timeLimits_[name] = milliseconds; }
+
   /// Runs what was added (the command line may choose, as in any Google Benchmark program) and prints the table.
   void Run(int argc, char** argv);
 
@@ -72,6 +75,7 @@ class MedianTable : public benchmark::BenchmarkReporter {
   int repetitions_;
   std::vector<std::string> names_;
   std::vector<RatioLimit> limits_;
+  std::map<std::string, double> timeLimits_;
   std::map<std::string, std::vector<double>> times_;
 };
 

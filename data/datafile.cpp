@@ -6,6 +6,7 @@
 #include <array>
 #include <bit>
 #include <cmath>
+#include <functional>
 #include <new>
 #include <utility>
 
@@ -23,7 +24,7 @@ namespace tervane {
 
 namespace {
 
-/// Values that are converted at one time, small enough for the processor's cache.
+/// Values that are read and converted at one time, so few that they are still in the processor's cache in between.
 constexpr std::size_t kPiece = std::size_t{1} << 16;
 
 /// Whether a file is netCDF, by its first bytes, or too short for anything else; `reason` says what is wrong with one
@@ -233,20 +234,26 @@ constexpr const char* kTooLarge = "a value is too large for single precision in 
 /// the end of what was cancelled.
 class PieceReader {
  public:
-  PieceReader(int file, const ItemStorage& storage, std::size_t size, ProgressPart progress)
-      : file_(file), storage_(storage), size_(static_cast<double>(size)), progress_(progress) {}
+  /// `convert` gets each piece of values, at most kPiece, soon after it was read.
+  PieceReader(int file, const ItemStorage& storage, std::size_t size, ProgressPart progress,
+              std::function<void(std::span<float>)> convert)
+      : file_(file),
+        storage_(storage),
+        size_(static_cast<double>(size)),
+        progress_(progress),
+        convert_(std::move(convert)) {}
 
   struct Box {
     std::vector<std::size_t> start, count;
   };
   /// Dimensions before `d` have a count of 1 each. Gives the status of the library; throws `Cancelled`.
   int Read(std::size_t d, Box box, std::span<float> values) {
-    if (values.size() <= kAtOnce || d == box.count.size()) return Get(box, values);
+    if (values.size() <= kPiece || d == box.count.size()) return Get(box, values);
     const std::size_t all = box.count[d], inner = values.size() / all;
-    std::size_t atOnce = std::max<std::size_t>(kAtOnce / inner, 1);
+    std::size_t atOnce = std::max<std::size_t>(kPiece / inner, 1);
     // A stored piece is unpacked as a whole, so that it should be asked for once.
-    if (!storage_.chunk.empty() && inner <= kAtOnce) atOnce = std::max(atOnce / Chunk(d) * Chunk(d), Chunk(d));
-    if (!storage_.chunk.empty() && inner > kAtOnce) atOnce = d + 2 == box.count.size() ? Chunk(d) : 1;
+    if (!storage_.chunk.empty() && inner <= kPiece) atOnce = std::max(atOnce / Chunk(d) * Chunk(d), Chunk(d));
+    if (!storage_.chunk.empty() && inner > kPiece) atOnce = d + 2 == box.count.size() ? Chunk(d) : 1;
     for (std::size_t done = 0; done < all; done += atOnce) {
       box.count[d] = std::min(atOnce, all - done);
       const std::span<float> piece = values.subspan(done * inner, box.count[d] * inner);
@@ -258,14 +265,12 @@ class PieceReader {
   }
 
  private:
-  static constexpr std::size_t kAtOnce = std::size_t{1} << 19;  ///< A millisecond, if the file is at hand.
-
   std::size_t Chunk(std::size_t d) const { return std::max<std::size_t>(storage_.chunk[d], 1); }
 
   int Get(const Box& box, std::span<float> values) {
     const std::size_t columns = box.count.empty() ? 1 : box.count.back();
     const std::size_t width = storage_.chunk.empty() ? columns : Chunk(box.count.size() - 1);
-    if (values.size() <= kAtOnce || width >= columns) return GetAtOnce(box, values);
+    if (values.size() <= kPiece || width >= columns) return GetAtOnce(box, values);
     // Wide rows of packed pieces, one piece after the other.
     Box part = box;
     std::vector<float> read;
@@ -283,10 +288,16 @@ class PieceReader {
 
   int GetAtOnce(const Box& box, std::span<float> values) {
     progress_.ThrowIfCancelled();
-    const netcdf::Lock lock;
-    const int status = nc_get_vara_float(file_, storage_.variable, box.start.data(), box.count.data(), values.data());
+    const int status = GetLocked(box, values);
     progress_.Tell(static_cast<double>(done_ += values.size()) / size_);
+    for (; status == NC_NOERR && !values.empty(); values = values.subspan(std::min(kPiece, values.size())))
+      convert_(values.first(std::min(kPiece, values.size())));
     return status;
+  }
+
+  int GetLocked(const Box& box, std::span<float> values) {
+    const netcdf::Lock lock;
+    return nc_get_vara_float(file_, storage_.variable, box.start.data(), box.count.data(), values.data());
   }
 
   int file_;
@@ -294,6 +305,7 @@ class PieceReader {
   double size_;
   std::size_t done_ = 0;
   ProgressPart progress_;
+  std::function<void(std::span<float>)> convert_;
 };
 
 }  // namespace
@@ -301,14 +313,12 @@ class PieceReader {
 std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector<std::size_t> start,
                                          std::vector<std::size_t> count, std::size_t nx, std::span<float> values,
                                          const UnitConversion* conversion, ProgressPart progress) const {
-  PieceReader reader(file.Id(), storage, values.size(), progress);
-  if (const int status = reader.Read(0, {std::move(start), std::move(count)}, values)) return netcdf::InWords(status);
   bool fits = true;
-  for (std::size_t begin = 0; begin < values.size(); begin += kPiece) {
-    const std::span<float> piece = values.subspan(begin, std::min(kPiece, values.size() - begin));
+  PieceReader reader(file.Id(), storage, values.size(), progress, [&](std::span<float> piece) {
     MarkMissing(storage, piece);
     if (conversion != nullptr) fits = Convert(*conversion, piece) && fits;
-  }
+  });
+  if (const int status = reader.Read(0, {std::move(start), std::move(count)}, values)) return netcdf::InWords(status);
   if (storage.isYTurned) {
     const std::size_t layerSize = nx * storage.lengths[static_cast<std::size_t>(storage.y)];
     for (std::size_t layer = 0; layer < values.size(); layer += layerSize) {
@@ -423,8 +433,10 @@ std::string DataFile::Open(const std::string& path) {
     } else if (reason.empty()) {
       const netcdf::Lock lock;
       int id = -1;
-      // An absolute path, because the library takes others for addresses of the network.
-      const int status = nc_open(AbsoluteFromHere(path).c_str(), NC_NOWRITE, &id);
+      // An absolute path, because the library takes others for addresses of the network. A file that is open to others
+      // too is read straight into the buffer for conversion, without one more in between, and single numbers alone.
+      std::size_t buffer = netcdf::kReadSize;
+      const int status = nc__open(AbsoluteFromHere(path).c_str(), NC_NOWRITE | NC_SHARE, &buffer, &id);
       if (status == NC_NOERR) {
         state->file = netcdf::Handle(id);
         reason = ReadHeader(id, state->header);

@@ -29,6 +29,8 @@ class Lock {
 
 /// Of a classic file that is written, in bytes.
 inline constexpr std::size_t kBufferSize = std::size_t{1} << 18;
+/// Of one that is read: what is read at one time.
+inline constexpr std::size_t kReadSize = std::size_t{1} << 16;
 
 /// Why a call failed, for the person who must act.
 std::string InWords(int status);

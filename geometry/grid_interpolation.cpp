@@ -12,9 +12,9 @@
 #include <utility>
 
 #include <fmt/format.h>
-#include <nanoflann.hpp>
 
 #include "geometry/delaunay.h"
+#include "geometry/quadrant_neighbours.h"
 #include "platform/row_workers.h"
 
 namespace tervane {
@@ -70,218 +70,242 @@ void MergeCoincident(std::vector<ScatteredPoint>& points, ProgressPart progress)
   points.erase(out, points.end());
 }
 
+/// Sorts points as whoever goes through rows needs them.
+void SortByY(std::vector<ScatteredPoint>& points, ProgressPart progress) {
+  Sort(points, progress,
+       [](const ScatteredPoint& a, const ScatteredPoint& b) { return a.y != b.y ? a.y < b.y : a.x < b.x; });
+}
+
+/// The first of points sorted by y that is not below a limit.
+std::vector<ScatteredPoint>::const_iterator FirstFrom(const std::vector<ScatteredPoint>& points, double limit) {
+  return std::lower_bound(points.begin(), points.end(), limit,
+                          [](const ScatteredPoint& point, double y) { return point.y < y; });
+}
+
+/// Gives cells of a row the values of points at their centres; the points are sorted by y.
+void PutHits(const std::vector<ScatteredPoint>& points, int j, const Target& target) {
+  const double y = j + 0.5;
+  for (auto point = FirstFrom(points, y - kHit); point != points.end() && point->y <= y + kHit; ++point) {
+    const double column = std::floor(point->x);
+    if (!(column >= 0 && column < target.nx)) continue;
+    if (std::hypot(point->x - column - 0.5, point->y - y) < kHit)
+      target.Row(j)[static_cast<int>(column)] = static_cast<float>(point->z);
+  }
+}
+
 // ---- Inverse distance
+
+// Loops over many numbers are compiled for wider processors too, and the program takes what its processor has. Each
+// cell has its own sum, so that results are the same to the last bit.
+#if defined(__GNUC__) && !defined(__clang__) && defined(__x86_64__) && defined(__linux__)
+#define TERVANE_ALSO_WIDE __attribute__((target_clones("avx2", "default")))
+#else
+#define TERVANE_ALSO_WIDE
+#endif
+
+/// Adds a point to the sums of cells whose centres lie `steps` + `offset` beside it.
+template <bool isSquared, class Number>
+TERVANE_ALSO_WIDE void AddWeights(Number offset, Number dy2, Number value, std::ptrdiff_t count,
+                                  const Number* __restrict steps, Number* __restrict weights, Number* __restrict sums) {
+  for (std::ptrdiff_t i = 0; i < count; ++i) {
+    const Number dx = steps[i] + offset, distance2 = dx * dx + dy2;
+    const Number weight = 1 / (isSquared ? distance2 : std::sqrt(distance2));
+    weights[i] += weight;
+    sums[i] += weight * value;
+  }
+}
+
+/// The sums of a row: a few points are added in a number that is fast, and gathered in one that is precise.
+template <class Number>
+struct RowSums {
+  explicit RowSums(std::size_t nx) : weights(nx), sums(nx), allWeights(nx), allSums(nx) {}
+
+  void Gather() {
+    for (std::size_t i = 0; i < weights.size(); ++i) {
+      allWeights[i] += static_cast<double>(std::exchange(weights[i], Number{0}));
+      allSums[i] += static_cast<double>(std::exchange(sums[i], Number{0}));
+    }
+  }
+
+  std::vector<Number> weights, sums;
+  std::vector<double> allWeights, allSums;
+};
 
 /// Each point adds to the cells of a row within its reach: nothing is searched, and the sums stay in the fastest cache.
 class InverseDistance {
  public:
   InverseDistance(std::vector<ScatteredPoint> points, double radius, bool isSquared, ProgressPart progress)
       : points_(std::move(points)), radius_(radius), isSquared_(isSquared) {
-    Sort(points_, progress,
-         [](const ScatteredPoint& a, const ScatteredPoint& b) { return a.y != b.y ? a.y < b.y : a.x < b.x; });
+    std::vector<double> values;
+    values.reserve(points_.size());
+    double size = 0;
+    for (const ScatteredPoint& point : points_) {
+      values.push_back(point.z);
+      size = std::max({size, std::abs(point.x), std::abs(point.y), std::abs(point.z)});
+    }
+    const auto [least, most] = std::minmax_element(values.begin(), values.end());
+    least_ = *least;
+    most_ = *most;
+    const auto middle = values.begin() + static_cast<std::ptrdiff_t>(values.size() / 2);
+    std::nth_element(values.begin(), middle, values.end());
+    median_ = *middle;
+    // Squares and products with a weight stay far from the ends of single precision.
+    constexpr double kSingle = 1e15;
+    isSingle_ = size < kSingle;
+    SortByY(points_, progress);
   }
 
   void Rows(int begin, int end, const Target& target) const {
-    const auto nx = static_cast<std::size_t>(target.nx);
-    std::vector<double> centres(nx), weights(nx), sums(nx);
-    std::vector<std::pair<int, double>> hits;
-    for (std::size_t i = 0; i < nx; ++i) centres[i] = static_cast<double>(i) + 0.5;
-    for (int j = begin; j < end; ++j) {
-      std::fill(weights.begin(), weights.end(), 0.0);
-      std::fill(sums.begin(), sums.end(), 0.0);
-      hits.clear();
-      const double y = j + 0.5;
-      const auto isBelow = [](const ScatteredPoint& point, double limit) { return point.y < limit; };
-      for (auto point = std::lower_bound(points_.begin(), points_.end(), y - radius_, isBelow);
-           point != points_.end() && point->y <= y + radius_; ++point) {
-        // Many points within a large radius make a single row take seconds.
-        if (target.progress.IsCancelled()) return;
-        AddPoint(*point, y, centres, weights, sums, hits);
-      }
-      float* const row = target.Row(j);
-      for (std::size_t i = 0; i < nx; ++i) {
-        row[i] = weights[i] > 0 ? static_cast<float>(sums[i] / weights[i]) : target.deleteValue;
-      }
-      for (const auto& [i, value] : hits) row[i] = static_cast<float>(value);
+    if (isSingle_) {
+      RowsIn<float>(begin, end, target);
+    } else {
+      RowsIn<double>(begin, end, target);
     }
   }
 
  private:
-  void AddPoint(const ScatteredPoint& point, double y, const std::vector<double>& centres, std::vector<double>& weights,
-                std::vector<double>& sums, std::vector<std::pair<int, double>>& hits) const {
+  template <class Number>
+  void RowsIn(int begin, int end, const Target& target) const {
+    const auto nx = static_cast<std::size_t>(target.nx);
+    std::vector<Number> steps(2 * nx - 1);
+    for (std::size_t i = 0; i < steps.size(); ++i) steps[i] = static_cast<Number>(i) - static_cast<Number>(nx - 1);
+    for (int j = begin; j < end; ++j) {
+      RowSums<Number> row(nx);
+      const double y = j + 0.5;
+      // So few that what single precision loses with each does not show.
+      constexpr int kTogether = 512;
+      int together = 0;
+      for (auto point = FirstFrom(points_, y - radius_); point != points_.end() && point->y <= y + radius_; ++point) {
+        // Many points within a large radius make a single row take seconds.
+        if (target.progress.IsCancelled()) return;
+        AddPoint(*point, y, steps.data() + (nx - 1), row);
+        if (++together % kTogether == 0) row.Gather();
+      }
+      row.Gather();
+      for (std::size_t i = 0; i < nx; ++i) {
+        const double weight = row.allWeights[i], value = median_ + row.allSums[i] / weight;
+        target.Row(j)[i] = weight > 0 ? static_cast<float>(std::clamp(value, least_, most_)) : target.deleteValue;
+      }
+      PutHits(points_, j, target);
+    }
+  }
+
+  template <class Number>
+  void AddPoint(const ScatteredPoint& point, double y, const Number* steps, RowSums<Number>& row) const {
     const double dy = point.y - y, dy2 = dy * dy;
     const double rest = radius_ * radius_ - dy2;
     if (rest < 0) return;
+    const auto nx = static_cast<int>(row.weights.size());
     const double half = std::sqrt(rest);
-    const auto [first, last] = CentresIn(point.x - half, point.x + half, static_cast<int>(centres.size()));
-    Add(point, dy2, first, last, centres.data(), weights.data(), sums.data());
-    const double nearest = std::floor(point.x);
-    if (nearest < first || nearest > last) return;
-    const double dx = point.x - nearest - 0.5;
-    if (dx * dx + dy2 < kHit * kHit) hits.emplace_back(static_cast<int>(nearest), point.z);
-  }
-
-  void Add(const ScatteredPoint& point, double dy2, int first, int last, const double* __restrict centres,
-           double* __restrict weights, double* __restrict sums) const {
-    const double x = point.x, z = point.z;
-    if (isSquared_) {
-      for (int i = first; i <= last; ++i) {
-        const double dx = centres[i] - x;
-        const double weight = 1 / (dx * dx + dy2);
-        weights[i] += weight;
-        sums[i] += weight * z;
-      }
-    } else {
-      for (int i = first; i <= last; ++i) {
-        const double dx = centres[i] - x;
-        const double weight = 1 / std::sqrt(dx * dx + dy2);
-        weights[i] += weight;
-        sums[i] += weight * z;
-      }
-    }
+    const auto [first, last] = CentresIn(point.x - half, point.x + half, nx);
+    if (first > last) return;
+    // The column of the point, from which others are whole steps away: a short distance loses nothing by rounding.
+    const int column = static_cast<int>(std::clamp(std::floor(point.x), 0.0, nx - 1.0));
+    const auto add = isSquared_ ? AddWeights<true, Number> : AddWeights<false, Number>;
+    // Values count from their median: of sums of differences, rounding takes less.
+    add(static_cast<Number>(column + 0.5 - point.x), static_cast<Number>(dy2), static_cast<Number>(point.z - median_),
+        last - first + 1, steps + (first - column), row.weights.data() + first, row.sums.data() + first);
   }
 
   std::vector<ScatteredPoint> points_;
   double radius_;
   bool isSquared_;
+  double least_, most_, median_;
+  bool isSingle_;
 };
 
 // ---- Bilinear
 
-struct PointCloud {
-  const std::vector<ScatteredPoint>& points;
-  ProgressPart progress;
-
-  std::size_t kdtree_get_point_count() const { return points.size(); }
-  double kdtree_get_pt(std::size_t index, std::size_t dimension) const {
-    // The only place at which the making of a tree can be left.
-    progress.ThrowIfCancelled();
-    return dimension == 0 ? points[index].x : points[index].y;
-  }
-  template <class Box>
-  bool kdtree_get_bbox(Box& /*box*/) const {
-    return false;
-  }
-};
-using PointTree =
-    nanoflann::KDTreeSingleIndexAdaptor<nanoflann::L2_Simple_Adaptor<double, PointCloud>, PointCloud, 2, std::uint32_t>;
-
-/// Collects the nearest point of each quadrant around a centre. An axis belongs to the quadrant that it opens, counted
-/// counter-clockwise.
-class QuadrantNeighbours {
- public:
-  struct Neighbour {
-    double x = 0, y = 0;  ///< Relative to the centre.
-    double z = 0;
-    double distance2 = 0;
-    std::uint32_t index = 0;
-  };
-
-  QuadrantNeighbours(const std::vector<ScatteredPoint>& points, double x, double y, double radius2)
-      : points_(points), x_(x), y_(y) {
-    // The tree takes what lies nearer than the limit, and the radius itself is to count.
-    limit_ = std::nextafter(radius2, std::numeric_limits<double>::infinity());
-    for (Neighbour& neighbour : found) neighbour.distance2 = limit_;
-  }
-
-  bool addPoint(double distance2, std::uint32_t index) {
-    const ScatteredPoint& point = points_[index];
-    const double dx = point.x - x_, dy = point.y - y_;
-    const std::size_t quadrant = dx > 0 && dy >= 0 ? 0 : dx <= 0 && dy > 0 ? 1 : dx < 0 ? 2 : 3;
-    Neighbour& neighbour = found[quadrant];
-    const bool isTie = distance2 == neighbour.distance2 && index < neighbour.index;
-    if (distance2 < neighbour.distance2 || isTie) neighbour = {dx, dy, point.z, distance2, index};
-    return true;
-  }
-  double worstDist() const {
-    double worst = 0;
-    for (const Neighbour& neighbour : found) worst = std::max(worst, neighbour.distance2);
-    return worst;
-  }
-  bool full() const { return true; }
-  std::size_t size() const { return found.size(); }
-
-  bool Has(const Neighbour& neighbour) const { return neighbour.distance2 < limit_; }
-  std::array<Neighbour, 4> found;
-
- private:
-  const std::vector<ScatteredPoint>& points_;
-  double x_, y_;
-  double limit_;
+/// A point as a cell sees it from its centre.
+struct Neighbour {
+  double x = 0, y = 0, z = 0;
+  double distance2 = 0;
 };
 
-/// The weights with which a + b x + c y + d x y through four points has its value at (0, 0); nothing when there is no
-/// such surface, or when it would leave the range of the four values.
-std::optional<std::array<double, 4>> BilinearWeights(const std::array<QuadrantNeighbours::Neighbour, 4>& points) {
-  double scale = 0;
-  for (const auto& point : points) scale = std::max({scale, std::abs(point.x), std::abs(point.y)});
+/// The value at (0, 0) of a + b x + c y + d x y through four points; nothing when there is no such surface, or when it
+/// would leave the range of the four values.
+std::optional<double> BilinearValue(const std::array<Neighbour, 4>& points) {
   // The weights w solve sum w = 1, sum w x = 0, sum w y = 0, sum w x y = 0: but for a factor they are the minors of the
   // rows x, y, x y.
-  std::array<std::array<double, 3>, 4> columns;
-  for (std::size_t k = 0; k < 4; ++k) {
-    const double x = points[k].x / scale, y = points[k].y / scale;
-    columns[k] = {x, y, x * y};
-  }
-  const auto minor = [&columns](std::size_t p, std::size_t q, std::size_t r) {
-    const auto &a = columns[p], &b = columns[q], &c = columns[r];
-    return a[0] * (b[1] * c[2] - b[2] * c[1]) - a[1] * (b[0] * c[2] - b[2] * c[0]) + a[2] * (b[0] * c[1] - b[1] * c[0]);
+  struct Column {
+    double x, y, xy;
   };
-  std::array<double, 4> weights = {minor(1, 2, 3), -minor(0, 2, 3), minor(0, 1, 3), -minor(0, 1, 2)};
-  double sum = 0, size = 0;
-  for (const double weight : weights) {
-    sum += weight;
-    size += std::abs(weight);
+  std::array<Column, 4> columns;
+  double scale = 0;
+  for (std::size_t k = 0; k < 4; ++k) {
+    const auto& [x, y, z, distance2] = points[k];
+    columns[k] = {x, y, x * y};
+    scale = std::max(scale, distance2);
   }
+  const auto cross = [](const Column& a, const Column& b) {
+    return Column{a.y * b.xy - a.xy * b.y, a.xy * b.x - a.x * b.xy, a.x * b.y - a.y * b.x};
+  };
+  const auto product = [](const Column& a, const Column& b) { return a.x * b.x + a.y * b.y + a.xy * b.xy; };
+  const Column first = cross(columns[0], columns[1]), second = cross(columns[2], columns[3]);
+  std::array<double, 4> weights = {product(columns[1], second), -product(columns[0], second),
+                                   product(columns[3], first), -product(columns[2], first)};
+  double sum = 0, size = 0, value = 0;
+  for (std::size_t k = 0; k < 4; ++k) {
+    sum += weights[k];
+    size += std::abs(weights[k]);
+    value += weights[k] * points[k].z;
+  }
+  double least = 0;
+  for (const double weight : weights) least = std::min(least, std::copysign(1.0, sum) * weight);
   constexpr double kRounding = 1e-12;
-  if (!(std::abs(sum) > kRounding * size) || size < kRounding) return std::nullopt;
-  for (double& weight : weights) {
-    weight /= sum;
-    if (weight < -kRounding) return std::nullopt;
-  }
-  return weights;
+  const bool isSurface = std::abs(sum) > kRounding * size && size >= kRounding * scale * scale;
+  if (!isSurface || least < -kRounding * std::abs(sum)) return std::nullopt;
+  return value / sum;
 }
 
 class Bilinear {
  public:
   Bilinear(std::vector<ScatteredPoint> points, double radius, ProgressPart progress)
-      : points_(std::move(points)), cloud_{points_, progress}, tree_(2, cloud_), radius2_(radius * radius) {}
+      : points_(std::move(points)), radius_(radius) {
+    SortByY(points_, progress);
+  }
 
   void Rows(int begin, int end, const Target& target) const {
+    QuadrantNeighbours neighbours(points_, target.nx, radius_);
+    neighbours.Find(begin, end, target.progress);
+    const std::uint32_t none = neighbours.NoPoint();
+    const double radius2 = radius_ * radius_;
     for (int j = begin; j < end; ++j) {
-      for (int i = 0; i < target.nx; ++i) target.Row(j)[i] = ValueAt(i + 0.5, j + 0.5, target.deleteValue);
+      target.progress.ThrowIfCancelled();
+      const std::array<const std::uint32_t*, 4> nearest = {neighbours.Row(0, j), neighbours.Row(1, j),
+                                                           neighbours.Row(2, j), neighbours.Row(3, j)};
+      std::array<Neighbour, 4> found;
+      for (int i = 0; i < target.nx; ++i) {
+        std::size_t count = 0;
+        for (const std::uint32_t* const quadrant : nearest) {
+          if (quadrant[i] == none) continue;
+          const ScatteredPoint& point = points_[quadrant[i]];
+          const double x = point.x - (i + 0.5), y = point.y - (j + 0.5), distance2 = x * x + y * y;
+          found[count] = {x, y, point.z, distance2};
+          count += distance2 <= radius2;
+        }
+        target.Row(j)[i] = count == 0 ? target.deleteValue : static_cast<float>(ValueOf(found, count));
+      }
+      PutHits(points_, j, target);
     }
   }
 
  private:
-  float ValueAt(double x, double y, float deleteValue) const {
-    QuadrantNeighbours neighbours(points_, x, y, radius2_);
-    const std::array<double, 2> query = {x, y};
-    tree_.findNeighbors(neighbours, query.data(), {});
-    std::size_t count = 0;
+  static double ValueOf(const std::array<Neighbour, 4>& found, std::size_t count) {
     double weights = 0, sum = 0;
-    for (const auto& neighbour : neighbours.found) {
-      if (!neighbours.Has(neighbour)) continue;
-      ++count;
-      if (neighbour.distance2 < kHit * kHit) return static_cast<float>(neighbour.z);
-      const double weight = 1 / std::sqrt(neighbour.distance2);
+    if (count == found.size()) {
+      if (const std::optional<double> value = BilinearValue(found)) return *value;
+    }
+    for (std::size_t k = 0; k < count; ++k) {
+      const double weight = 1 / std::sqrt(found[k].distance2);
       weights += weight;
-      sum += weight * neighbour.z;
+      sum += weight * found[k].z;
     }
-    if (count == 0) return deleteValue;
-    if (count == 4) {
-      if (const auto bilinear = BilinearWeights(neighbours.found)) {
-        sum = 0;
-        for (std::size_t k = 0; k < 4; ++k) sum += (*bilinear)[k] * neighbours.found[k].z;
-        return static_cast<float>(sum);
-      }
-    }
-    return static_cast<float>(sum / weights);
+    return sum / weights;
   }
 
   std::vector<ScatteredPoint> points_;
-  PointCloud cloud_;
-  PointTree tree_;
-  double radius2_;
+  double radius_;
 };
 
 // ---- Triangles
@@ -458,11 +482,13 @@ FileResult InterpolateChecked(std::vector<ScatteredPoint> points, const GridGeom
   };
   // Many points within reach make a row slow, and a user who cancels should not wait for several.
   constexpr int kFewRows = 8;
+  // A sweep over rows first takes in all points within reach, so that it should not be for a few rows alone.
+  constexpr int kRowsOfSweep = 32;
   constexpr std::size_t kManyPoints = 100'000;
   FileResult result;
   switch (options.method) {
     case InterpolationMethod::Bilinear:
-      run(kFewRows, Bilinear(std::move(points), radius, making));
+      run(kRowsOfSweep, Bilinear(std::move(points), radius, making));
       break;
     case InterpolationMethod::Triangular: {
       const Triangular triangular(points, geometry, making);

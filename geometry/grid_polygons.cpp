@@ -5,8 +5,10 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdlib>
+#include <deque>
 #include <map>
 #include <new>
+#include <utility>
 
 #include <fmt/format.h>
 
@@ -18,7 +20,23 @@ namespace {
 
 /// The first row or column at or behind `limit` whose centre lies at or beyond it.
 int FirstCentre(double limit, int count) {
-  return static_cast<int>(std::clamp(std::ceil(limit - 0.5), 0.0, static_cast<double>(count)));
+  // Without a call of the library, of which a map would need millions.
+  const double place = std::clamp(limit - 0.5, 0.0, static_cast<double>(count));
+  const int whole = static_cast<int>(place);
+  return whole < place ? whole + 1 : whole;
+}
+
+/// Most rows have a few crossings, for which the library's sort is slow.
+template <class Iterator>
+void SortFew(Iterator begin, Iterator end) {
+  constexpr std::ptrdiff_t kFew = 16;
+  if (end - begin > kFew) return std::sort(begin, end);
+  for (Iterator next = begin; next != end; ++next) {
+    const auto value = *next;
+    Iterator place = next;
+    for (; place != begin && value < place[-1]; --place) *place = place[-1];
+    *place = value;
+  }
 }
 
 }  // namespace
@@ -28,7 +46,7 @@ PolygonRaster::PolygonRaster(const GridGeometry& geometry, ProgressPart progress
       ny_(geometry.ny),
       transform_(geometry),
       progress_(progress),
-      rowStarts_(static_cast<std::size_t>(ny_) + 1) {}
+      rows_(static_cast<std::size_t>(ny_) + 1) {}
 
 template <class Found>
 void PolygonRaster::ForEdges(const Shape& shape, std::size_t first, std::size_t last, const Found& found) const {
@@ -57,59 +75,110 @@ const std::vector<PolygonRaster::Span>& PolygonRaster::Spans(const Shape& shape,
     crossings += static_cast<std::size_t>(rowEnd - rowBegin);
     lowest = std::min(lowest, rowBegin);
     highest = std::max(highest, rowEnd);
+    ++rows_[static_cast<std::size_t>(rowBegin)].moreEdges;
+    --rows_[static_cast<std::size_t>(rowEnd)].moreEdges;
   });
   if (crossings == 0) return spans_;
   // A polygon that goes to and fro over a large grid crosses more rows than there is memory for at once.
   constexpr std::size_t kMostCrossings = 10'000'000;
   const auto bands = static_cast<int>(std::min(crossings / kMostCrossings + 1, static_cast<std::size_t>(ny_)));
   const int bandRows = (highest - lowest) / bands + 1;
-  for (int begin = lowest; begin < highest; begin += bandRows) {
-    AddSpans(shape, first, last, begin, std::min(highest, begin + bandRows));
-  }
+  std::ptrdiff_t edges = 0;
+  for (int begin = lowest; begin < highest; begin += bandRows)
+    AddSpans(shape, first, last, begin, std::min(highest, begin + bandRows), edges);
+  rows_[static_cast<std::size_t>(highest)].moreEdges = 0;
   return spans_;
 }
 
-void PolygonRaster::AddSpans(const Shape& shape, std::size_t first, std::size_t last, int begin, int end) {
-  crossings_.clear();
+void PolygonRaster::AddSpans(const Shape& shape, std::size_t first, std::size_t last, int begin, int end,
+                             std::ptrdiff_t& edges) {
+  std::ptrdiff_t count = 0;
+  for (int j = begin; j < end; ++j) {
+    Row& row = rows_[static_cast<std::size_t>(j)];
+    row.crossingsEnd = count;
+    count += edges += std::exchange(row.moreEdges, 0);
+  }
+  crossings_.resize(static_cast<std::size_t>(count));
   ForEdges(shape, first, last, [&](MapPoint low, MapPoint high, int rowBegin, int rowEnd) {
     const double slope = (high.x - low.x) / (high.y - low.y);
     for (int j = std::max(begin, rowBegin); j < std::min(end, rowEnd); ++j) {
-      crossings_.push_back({j, low.x + (j + 0.5 - low.y) * slope});
+      const std::ptrdiff_t at = rows_[static_cast<std::size_t>(j)].crossingsEnd++;
+      crossings_[static_cast<std::size_t>(at)] = low.x + (j + 0.5 - low.y) * slope;
     }
   });
-
-  // Sorted by row with one count, then within each row.
-  const auto rows = static_cast<std::size_t>(end - begin);
-  std::fill(rowStarts_.begin(), rowStarts_.begin() + static_cast<std::ptrdiff_t>(rows) + 1, std::size_t{0});
-  const auto rowOf = [begin](const Crossing& crossing) { return static_cast<std::size_t>(crossing.j - begin); };
-  for (const Crossing& crossing : crossings_) ++rowStarts_[rowOf(crossing) + 1];
-  for (std::size_t row = 0; row < rows; ++row) rowStarts_[row + 1] += rowStarts_[row];
-  sorted_.resize(crossings_.size());
-  for (const Crossing& crossing : crossings_) sorted_[rowStarts_[rowOf(crossing)]++] = crossing;
-  // Each start has moved to the start of the next row.
-  for (std::size_t row = 0, at = 0; row < rows; at = rowStarts_[row++]) {
-    const auto rowBegin = sorted_.begin() + static_cast<std::ptrdiff_t>(at);
-    const auto rowEnd = sorted_.begin() + static_cast<std::ptrdiff_t>(rowStarts_[row]);
+  auto rowBegin = crossings_.begin();
+  for (int j = begin; j < end; ++j) {
+    const auto rowEnd = crossings_.begin() + rows_[static_cast<std::size_t>(j)].crossingsEnd;
     progress_.ThrowIfCancelled();
-    std::sort(rowBegin, rowEnd, [](const Crossing& a, const Crossing& b) { return a.x < b.x; });
-    for (auto it = rowBegin; it + 1 < rowEnd; it += 2) {
-      const int from = FirstCentre(it->x, nx_), to = FirstCentre((it + 1)->x, nx_);
-      if (from < to) spans_.push_back({it->j, from, to});
+    SortFew(rowBegin, rowEnd);
+    for (; rowEnd - rowBegin >= 2; rowBegin += 2) {
+      const int from = FirstCentre(rowBegin[0], nx_), to = FirstCentre(rowBegin[1], nx_);
+      if (from < to) spans_.push_back({j, from, to});
     }
+    rowBegin = rowEnd;
   }
 }
+
+namespace {
+
+/// Puts codes into parts of rows, many at a time, and those of a few rows together: the cells stay in a fast cache
+/// while one polygon after the other is put over them.
+class SpanPainter {
+ public:
+  SpanPainter(const GridGeometry& geometry, std::vector<float>& values)
+      : nx_(geometry.nx), values_(values), bands_(static_cast<std::size_t>((geometry.ny - 1) / kBandRows + 1)) {
+    // Half as much memory as the grid takes, or little.
+    mostSpans_ = std::max(values.size() * sizeof(float) / 2 / sizeof(Painted), std::size_t{1} << 16);
+  }
+
+  /// Later ones count where spans overlap.
+  void Add(const PolygonRaster::Span& span, float code) {
+    if (count_ == mostSpans_) Paint({});
+    ++count_;
+    bands_[static_cast<std::size_t>(span.j / kBandRows)].push_back(
+        {span.j % kBandRows * nx_ + span.begin, span.end - span.begin, code});
+  }
+  void Paint(ProgressPart progress) {
+    auto first = values_.begin();
+    for (std::deque<Painted>& band : bands_) {
+      for (const Painted& each : band) std::fill_n(first + each.begin, each.count, each.code);
+      band.clear();
+      progress.ThrowIfCancelled();
+      // The last band may have fewer rows, and none follows it.
+      if (&band != &bands_.back()) first += static_cast<std::ptrdiff_t>(kBandRows) * nx_;
+    }
+    count_ = 0;
+    progress.Tell(1);
+  }
+
+ private:
+  /// Cells of a band, counted row by row.
+  struct Painted {
+    int begin, count;
+    float code;
+  };
+  static constexpr int kBandRows = 8;
+
+  int nx_;
+  std::vector<float>& values_;
+  std::vector<std::deque<Painted>> bands_;
+  std::size_t count_ = 0, mostSpans_;
+};
+
+}  // namespace
 
 void PutPolygons(const std::vector<Shape>& shapes, const std::vector<float>& codes, const GridGeometry& geometry,
                  float deleteValue, std::vector<float>& values, ProgressPart progress) {
   PolygonRaster raster(geometry, progress);
+  SpanPainter painter(geometry, values);
+  const ProgressPart finding = progress.Part(0, 0.7), painting = progress.Part(0.7, 1);
   for (std::size_t k = 0; k < shapes.size(); ++k) {
-    progress.Tell(static_cast<double>(k) / static_cast<double>(shapes.size()));
+    finding.Tell(static_cast<double>(k) / static_cast<double>(shapes.size()));
     if (codes[k] == deleteValue) continue;
-    for (const PolygonRaster::Span& span : raster.Spans(shapes[k], 0, shapes[k].parts.size())) {
-      const auto row = values.begin() + static_cast<std::ptrdiff_t>(span.j) * geometry.nx;
-      std::fill(row + span.begin, row + span.end, codes[k]);
-    }
+    for (const PolygonRaster::Span& span : raster.Spans(shapes[k], 0, shapes[k].parts.size()))
+      painter.Add(span, codes[k]);
   }
+  painter.Paint(painting);
 }
 
 std::vector<float> DomainOfPolygons(const std::vector<Shape>& shapes, const GridGeometry& geometry,

@@ -6,6 +6,7 @@
 // belongs to the polygon on the side to which x, then y, grows.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -51,21 +52,21 @@ class PolygonRaster {
   const std::vector<Span>& Spans(const Shape& shape, std::size_t first, std::size_t last);
 
  private:
-  struct Crossing {
-    int j;
-    double x;
+  struct Row {
+    std::ptrdiff_t moreEdges = 0;     ///< Edges that cross its centres, beyond those of the row below.
+    std::ptrdiff_t crossingsEnd = 0;  ///< Behind its crossings that were found.
   };
   /// Calls `found(low, high, rowBegin, rowEnd)` for each edge that crosses centres of rows, from its lower end.
   template <class Found>
   void ForEdges(const Shape& shape, std::size_t first, std::size_t last, const Found& found) const;
-  /// Adds the spans of rows [begin, end).
-  void AddSpans(const Shape& shape, std::size_t first, std::size_t last, int begin, int end);
+  /// Adds the spans of rows [begin, end); `edges` are those that cross the row below, then the last row.
+  void AddSpans(const Shape& shape, std::size_t first, std::size_t last, int begin, int end, std::ptrdiff_t& edges);
 
   int nx_, ny_;
   GridTransform transform_;
   ProgressPart progress_;
-  std::vector<Crossing> crossings_, sorted_;
-  std::vector<std::size_t> rowStarts_;
+  std::vector<double> crossings_;  ///< Along x, row by row.
+  std::vector<Row> rows_;
   std::vector<Span> spans_;
 };
 

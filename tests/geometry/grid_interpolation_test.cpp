@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "geometry/grid_interpolation.h"
 
+#include <algorithm>
+#include <array>
 #include <cmath>
 #include <limits>
 #include <random>
@@ -49,24 +51,132 @@ std::vector<float> Interpolated(const std::vector<ScatteredPoint>& points, const
 }
 
 TEST(Interpolation, WeighsWithInverseDistances) {
-  const std::vector<ScatteredPoint> points = RandomPoints(60);
   const GridTransform transform(kGrid);
-  for (const auto& [method, power] : {std::pair{InverseDistance, 1}, {InverseDistanceSquared, 2}}) {
-    const std::vector<float> values = Interpolated(points, kGrid, Options(method, 12));
-    int empty = 0;
-    for (int cell = 0; cell < 40 * 30; ++cell) {
-      const MapPoint centre = transform.ToWorld({cell % 40 + 0.5, cell / 40 + 0.5});
-      double weights = 0, sum = 0;
-      for (const ScatteredPoint& point : points) {
-        const double distance = std::hypot(point.x - centre.x, point.y - centre.y);
-        if (distance > 12) continue;
-        weights += std::pow(distance, -power);
-        sum += std::pow(distance, -power) * point.z;
+  const struct {
+    const char* name;
+    int points;
+    double factor, offset;
+    bool leavesEmpty;
+  } rows[] = {
+      {"few points", 60, 1, 0, true},
+      {"thousands within reach of a row", 9000, 1, 0, false},
+      {"small differences of large values", 60, 1e-3, 1e4, true},
+      {"values whose squares no float holds", 60, 1e30, 0, true},
+  };
+  for (const auto& row : rows) {
+    std::vector<ScatteredPoint> points = RandomPoints(row.points);
+    for (ScatteredPoint& point : points) point.z = point.z * row.factor + row.offset;
+    for (const auto& [method, power] : {std::pair{InverseDistance, 1}, {InverseDistanceSquared, 2}}) {
+      const std::vector<float> values = Interpolated(points, kGrid, Options(method, 12));
+      int empty = 0, different = 0;
+      for (int cell = 0; cell < 40 * 30; ++cell) {
+        const MapPoint centre = transform.ToWorld({cell % 40 + 0.5, cell / 40 + 0.5});
+        double weights = 0, sum = 0;
+        for (const ScatteredPoint& point : points) {
+          const double distance2 =
+              (point.x - centre.x) * (point.x - centre.x) + (point.y - centre.y) * (point.y - centre.y);
+          if (distance2 > 12 * 12) continue;
+          const double weight = 1 / (power == 1 ? std::sqrt(distance2) : distance2);
+          weights += weight;
+          sum += weight * point.z;
+        }
+        empty += weights == 0;
+        const double expected = weights > 0 ? sum / weights : kEmpty, found = values[static_cast<std::size_t>(cell)];
+        different += !(std::abs(found - expected) <= 1e-6 * std::abs(expected));
       }
-      empty += weights == 0;
-      EXPECT_NEAR(values[static_cast<std::size_t>(cell)], weights > 0 ? sum / weights : kEmpty, 1e-4) << cell;
+      EXPECT_EQ(different, 0) << row.name << ", power " << power;
+      EXPECT_EQ(empty > 10, row.leavesEmpty) << row.name;
     }
-    EXPECT_GT(empty, 10);
+  }
+}
+
+/// The value at (0, 0) of a + b x + c y + d x y through four points, by elimination; not a number when there is none.
+double SurfaceThrough(std::array<ScatteredPoint, 4> points) {
+  std::array<std::array<double, 5>, 4> rows;
+  for (std::size_t k = 0; k < 4; ++k) rows[k] = {points[k].x * points[k].y, points[k].y, points[k].x, 1, points[k].z};
+  for (std::size_t k = 0; k < 3; ++k) {
+    std::swap(rows[k],
+              *std::max_element(rows.begin() + static_cast<std::ptrdiff_t>(k), rows.end(),
+                                [k](const auto& a, const auto& b) { return std::abs(a[k]) < std::abs(b[k]); }));
+    for (std::size_t other = k + 1; other < 4; ++other) {
+      const double factor = rows[other][k] / rows[k][k];
+      for (std::size_t i = k; i < 5; ++i) rows[other][i] -= factor * rows[k][i];
+    }
+  }
+  return rows[3][4] / rows[3][3];
+}
+
+/// The bilinear method, straight from its definition.
+double BilinearAt(const std::vector<ScatteredPoint>& points, double x, double y, double radius) {
+  struct Found {
+    double distance = std::numeric_limits<double>::infinity();
+    ScatteredPoint point;
+  };
+  std::array<Found, 4> found;
+  for (const ScatteredPoint& each : points) {
+    const ScatteredPoint point{each.x - x, each.y - y, each.z};
+    const double distance = std::hypot(point.x, point.y);
+    if (distance == 0) return point.z;
+    const std::size_t quadrant = point.x > 0 && point.y >= 0   ? 0
+                                 : point.x <= 0 && point.y > 0 ? 1
+                                 : point.x < 0                 ? 2
+                                                               : 3;
+    if (distance <= radius && distance < found[quadrant].distance) found[quadrant] = {distance, point};
+  }
+  double weights = 0, sum = 0;
+  for (const Found& each : found) {
+    weights += 1 / each.distance;
+    sum += each.point.z / each.distance;
+  }
+  // A surface stays between the values when all weights are above 0: then it does whatever the values are.
+  bool isSurface =
+      std::all_of(found.begin(), found.end(), [](const Found& each) { return std::isfinite(each.distance); });
+  for (std::size_t k = 0; k < 4 && isSurface; ++k) {
+    std::array<ScatteredPoint, 4> corners;
+    for (std::size_t i = 0; i < 4; ++i) corners[i] = {found[i].point.x, found[i].point.y, i == k ? 1.0 : 0.0};
+    isSurface = SurfaceThrough(corners) > -1e-10;
+  }
+  if (!isSurface) return weights > 0 ? sum / weights : static_cast<double>(kEmpty);
+  return SurfaceThrough({found[0].point, found[1].point, found[2].point, found[3].point});
+}
+
+TEST(Interpolation, FindsTheNearestPointOfEachQuadrant) {
+  const GridGeometry grid{37, 29, 1, 0, 0, 0, ""};
+  std::mt19937 random(5);
+  const auto scattered = [&random](int count, double from, double to, bool isRound) {
+    std::uniform_real_distribution<double> place(from, to), z(100, 200);
+    std::vector<ScatteredPoint> points;
+    for (int i = 0; i < count; ++i) {
+      const double x = place(random), y = place(random);
+      points.push_back(isRound ? ScatteredPoint{std::round(2 * x) / 2, y, z(random)} : ScatteredPoint{x, y, z(random)});
+    }
+    return points;
+  };
+  const struct {
+    const char* name;
+    std::vector<ScatteredPoint> points;
+    double radius;
+  } rows[] = {
+      {"fewer points than cells", scattered(40, -3, 40, false), 9},
+      {"many points in each cell", scattered(5000, 0, 37, false), 6},
+      {"a radius far beyond the grid", scattered(60, -100, 100, false), 1e9},
+      {"points on the axes of the centres", scattered(200, -3, 40, true), 5},
+      {"all points off the grid", scattered(60, -30, -1, false), 50},
+      {"a radius below a cell", scattered(3000, 0, 37, false), 0.3},
+  };
+  for (const auto& row : rows) {
+    const std::vector<float> values = Interpolated(row.points, grid, Options(Bilinear, row.radius, 2));
+    std::size_t cell = 0;
+    int empty = 0, different = 0;
+    for (int j = 0; j < grid.ny; ++j) {
+      for (int i = 0; i < grid.nx; ++i, ++cell) {
+        const double expected = BilinearAt(row.points, i + 0.5, j + 0.5, row.radius);
+        empty += expected == static_cast<double>(kEmpty);
+        different += !(std::abs(static_cast<double>(values[cell]) - expected) < 1e-3);
+      }
+    }
+    EXPECT_EQ(different, 0) << row.name;
+    EXPECT_LT(empty, 37 * 29) << row.name;
   }
 }
 

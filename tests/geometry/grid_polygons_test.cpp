@@ -108,6 +108,33 @@ TEST(Polygons, MayCrossMoreRowsThanAreHeldAtOnce) {
   }
 }
 
+TEST(Polygons, CountInTheOrderOfTheFileHoweverManyThereAre) {
+  std::mt19937 random(12);
+  std::uniform_real_distribution<double> coordinate(-20, 120);
+  const GridGeometry geometry{100, 101, 1, 0, 0, 0, ""};
+  std::vector<Shape> shapes;
+  std::vector<float> codes, expected(geometry.CellCount(), -1);
+  std::size_t spans = 0;
+  PolygonRaster raster(geometry);
+  for (int k = 0; k < 1500; ++k) {
+    Shape& shape = shapes.emplace_back();
+    shape.parts = {0};
+    for (int i = 0; i < 7; ++i) shape.points.push_back({coordinate(random), coordinate(random)});
+    codes.push_back(static_cast<float>(k % 7 == 0 ? -1 : k));
+    if (codes.back() == -1) continue;
+    for (const PolygonRaster::Span& span : raster.Spans(shape, 0, 1)) {
+      const auto row = expected.begin() + span.j * 100;
+      std::fill(row + span.begin, row + span.end, codes.back());
+      ++spans;
+    }
+  }
+  // More than are held before they are put into the cells.
+  EXPECT_GT(spans, 150'000U);
+  std::vector<float> values(geometry.CellCount(), -1);
+  PutPolygons(shapes, codes, geometry, -1, values);
+  EXPECT_EQ(values, expected);
+}
+
 TEST(Polygons, GiveADomainWithItsOuterBoundary) {
   const GridGeometry geometry{9, 8, 10, 0, 0, 0, ""};
   Shape withHole = Rectangle(10, 10, 70, 70);
