@@ -5,6 +5,7 @@
 // rules that say when it is enabled and shown. A program turns it into widgets, a text, or a test.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <optional>
@@ -85,6 +86,8 @@ class Control {
   /// What a taken value brings with it; gives further hints of the change.
   std::function<int()> then;
   std::function<bool()> enabledWhen, shownWhen;
+  /// What the value belongs to, where that changes: what was refused is another one's then.
+  std::function<std::uintptr_t()> subject;
   bool beside = false;  ///< Stands in the same row as the control before it.
   int hint = kDataChanged;
   bool revalidates = false;         ///< Other nodes' rules depend on the value.
@@ -184,6 +187,9 @@ class PageForm {
   PageForm& GroupBeside(std::string title);
   Control& SubForms(std::vector<std::shared_ptr<PageForm>> forms, std::function<int()> current);
 
+  /// A control of that kind, whose value is bound by who adds it.
+  Control& Bare(ControlKind kind, std::string label) { return Add(kind, std::move(label)); }
+
   CYbSEKvfBase& Node() const { return node_; }
   const std::vector<std::unique_ptr<Control>>& Controls() const { return controls_; }
   std::vector<std::unique_ptr<Control>>& Controls() { return controls_; }
@@ -194,6 +200,8 @@ class PageForm {
   /// Shows and takes quantities in these units from now on, also in groups, sub-forms and tables; they are asked each
   /// time and must outlive the form. Null for base units.
   void SetDisplayUnits(const DisplayUnits* units);
+  /// Lets the tables ask their rules anew.
+  void Follow();
 
   /// How dates are shown and typed.
   static constexpr std::string_view kDateFormat = "%Y/%m/%d  %H:%M";
