@@ -119,9 +119,9 @@ std::string EnterValue(CYbDateTime& value, const std::string& typed) {
   return {};
 }
 
-std::string EnterValue(FileName& value, const std::string& typed, const CYbSEKvfBase& node) {
+std::string EnterValue(FileName& value, const std::string& typed, const CYbSEKvfBase* node) {
   if (FirstInvalidUtf8(typed)) return "a file name in UTF-8 was expected";
-  const std::string folder = node.GetRoot() ? node.GetRoot()->SetupFolder() : std::string();
+  const std::string folder = !node ? value.Folder() : node->GetRoot() ? node->GetRoot()->SetupFolder() : std::string();
   value = IsAbsolutePath(typed) ? FileName::Picked(typed, folder) : FileName(typed, folder);
   return {};
 }

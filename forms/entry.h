@@ -49,7 +49,8 @@ std::string ShownNumber(double value, const FieldUnit& unit, const std::string& 
 std::string EnterValue(std::string& value, const std::string& typed);
 /// A date, also of days alone: "2000/01/31 12:00", "2000-01-31".
 std::string EnterValue(CYbDateTime& value, const std::string& typed);
-/// A name that is typed stays as it is; an absolute one at or below the setup's folder becomes relative.
-std::string EnterValue(FileName& value, const std::string& typed, const CYbSEKvfBase& node);
+/// A name that is typed stays as it is; an absolute one at or below the folder of the node's setup becomes relative.
+/// Without a node it is the folder of the name before.
+std::string EnterValue(FileName& value, const std::string& typed, const CYbSEKvfBase* node);
 
 }  // namespace tervane

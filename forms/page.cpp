@@ -14,6 +14,7 @@ void CYbSEDlgBase::MakeForm() {
   form_ = std::make_unique<PageForm>(node_);
   Describe(*form_);
   form_->SetDisplayUnits(context_.displayUnits);
+  form_->Follow();
 }
 
 void CYbSEDlgBase::Initialize() {
@@ -22,6 +23,7 @@ void CYbSEDlgBase::Initialize() {
 }
 
 void CYbSEDlgBase::UpdateDoc(int hint, const std::string& action, const void* source) const {
+  if (form_) form_->Follow();
   if (context_.updateDoc) context_.updateDoc(hint, action, source);
 }
 
@@ -48,6 +50,13 @@ void CYbSEDlgBase::Browse(Control& control) {
   if (control.IsEnabled() && control.browse && control.browse(Outside())) Took(control);
 }
 
+std::optional<std::string> CYbSEDlgBase::AskFile(Host::FileQuestion question, const std::string& now) const {
+  const std::string folder = node_.GetRoot() ? node_.GetRoot()->SetupFolder() : std::string();
+  question.current = FileName(now, folder).Absolute();
+  if (question.current.empty()) question.current = folder;
+  return Outside().AskFileToOpen(question);
+}
+
 void CYbSEDlgBase::Took(const Control& control) {
   const int hint = control.hint | (control.then ? control.then() : 0);
   if (control.revalidates && node_.GetRoot()) node_.GetRoot()->ReValidate();
@@ -60,12 +69,21 @@ void CYbSEDlgBase::Press(const Control& control) const {
   if (control.press && control.IsEnabled()) control.press();
 }
 
+void CYbSEDlgBase::ChooseRow(const Control& table, int row) {
+  if (!table.table->Choose(row)) return;
+  SetData();
+  if (context_.syncSoon) context_.syncSoon();
+}
+
 std::string CYbSEDlgBase::EnterCell(const Control& table, int row, int column, const std::string& typed) {
   if (table.table->Cell(row, column) == typed) return {};
+  if (!table.IsEnabled()) return NoCell().why;
   if (std::string expected = table.table->Enter(row, column, typed); !expected.empty()) return expected;
-  UpdateDoc(kDataChanged,
-            fmt::format("Change {}", ActionName(table.table->Columns()[static_cast<std::size_t>(column - 1)].head)),
-            &table);
+  const TableColumn& changed = *table.table->Column(column);
+  const std::string name = ActionName(changed.head);
+  const int hint = changed.hint;
+  SetData();
+  UpdateDoc(hint, name.empty() ? "Change Cell" : "Change " + name, &table);
   return {};
 }
 
@@ -78,28 +96,32 @@ bool CYbSEDlgBase::Tell(int hint, const std::string& action) {
 }
 
 bool CYbSEDlgBase::ChangeRows(const Control& table, RowAction action, int first, int last) {
+  if (!table.IsEnabled()) return false;
   const int rows = first < 1 ? 1 : std::min(last, table.table->RowCount()) - first + 1;
   const int hint = table.table->ChangeRows(action, first, last);
   return Tell(hint, table.table->ActionName(action, rows));
 }
 
 bool CYbSEDlgBase::ChangeRow(const Control& table, RowAction action, int row) {
-  return Tell(table.table->ChangeRow(action, row), table.table->ActionName(action, 1));
+  return table.IsEnabled() && Tell(table.table->ChangeRow(action, row), table.table->ActionName(action, 1));
 }
 
 CellsResult CYbSEDlgBase::Paste(const Control& table, const CellRange& selected, std::string_view text) {
+  if (!table.IsEnabled()) return {};
   CellsResult result = table.table->Paste(selected, text);
   Tell(result.hint, "Paste");
   return result;
 }
 
 CellsResult CYbSEDlgBase::FillDown(const Control& table, const CellRange& cells) {
+  if (!table.IsEnabled()) return {};
   CellsResult result = table.table->FillDown(cells);
   Tell(result.hint, "Fill Down");
   return result;
 }
 
 CellsResult CYbSEDlgBase::ClearCells(const Control& table, const CellRange& cells) {
+  if (!table.IsEnabled()) return {};
   CellsResult result = table.table->Clear(cells);
   Tell(result.hint, "Clear");
   return result;

@@ -4,6 +4,7 @@
 
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 
 #include "core/document.h"
@@ -48,8 +49,10 @@ class CYbSEDlgBase {
   const PageContext& Context() const { return context_; }
   Host& Outside() const { return context_.host; }
   /// For a form without a document: what follows each change.
-  void FollowItself(std::function<void()> follow) {
+  /// `soon` is what follows once the present call has returned.
+  void FollowItself(std::function<void()> follow, std::function<void()> soon) {
     context_.updateDoc = [follow = std::move(follow)](int, const std::string&, const void*) { follow(); };
+    context_.syncSoon = std::move(soon);
   }
   /// Called once, before the page is shown the first time: makes the form.
   virtual void Initialize();
@@ -68,7 +71,11 @@ class CYbSEDlgBase {
   std::string Enter(Control& control, const std::string& typed);
   /// Lets the user choose a file.
   void Browse(Control& control);
+  /// Asks for a file, beginning at the one that is named now.
+  std::optional<std::string> AskFile(Host::FileQuestion question, const std::string& now) const;
   void Press(const Control& control) const;
+  /// Makes a row of a table the current one, which fields below it show.
+  void ChooseRow(const Control& table, int row);
   /// Types into a cell of a table.
   std::string EnterCell(const Control& table, int row, int column, const std::string& typed);
 

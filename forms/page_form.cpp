@@ -59,7 +59,7 @@ Control& PageForm::Add(ControlKind kind, std::string label) {
   Control& control = *controls_.emplace_back(std::make_unique<Control>());
   control.kind = kind;
   control.label = std::move(label);
-  control.node = &node_;
+  control.node = control.pageNode = &node_;
   return control;
 }
 
@@ -219,7 +219,7 @@ Control& PageForm::Date(std::string label, std::function<CYbDateTime()> get,
 Control& PageForm::File(std::string label, FileName& value) {
   Control& control = AddBound(ControlKind::File, std::move(label), &value);
   control.text = [&value] { return value.Text(); };
-  control.enter = [&value, this](const std::string& typed) { return EnterValue(value, typed, node_); };
+  control.enter = [&value, this](const std::string& typed) { return EnterValue(value, typed, &node_); };
   return control;
 }
 
@@ -268,6 +268,7 @@ Control& PageForm::Browser(std::function<std::string()> page) {
 
 Control& PageForm::Table(std::shared_ptr<TableForm> table) {
   Control& control = Add(ControlKind::Table, {});
+  table->SetNode(&node_);
   control.table = std::move(table);
   return control;
 }
@@ -316,6 +317,12 @@ void PageForm::SetDisplayUnits(const DisplayUnits* units) {
   ForEach([units](Control& control) {
     control.displayUnits = units;
     if (control.table) control.table->SetDisplayUnits(units);
+  });
+}
+
+void PageForm::Follow() {
+  ForEach([](Control& control) {
+    if (control.table) control.table->Follow();
   });
 }
 

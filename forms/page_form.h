@@ -5,6 +5,7 @@
 // rules that say when it is enabled and shown. A program turns it into widgets, a text, or a test.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <optional>
@@ -79,12 +80,13 @@ class Control {
   int itemType = 0;                                   ///< The number is a quantity of that item type; 0 for none.
   const DisplayUnits* displayUnits = nullptr;         ///< The user's units; null for base units.
   std::function<std::vector<std::string>()> options;  ///< Of a radio group or drop list.
-  std::vector<int> optionValues;  ///< What the node stores for each; empty for the options' numbers.
-  std::string key;                ///< Of the node, so that a finding leads here.
-  const CYbSEKvfBase* node = nullptr;
-  Host::FileQuestion fileQuestion;    ///< Of a file name.
-  std::string folder;                 ///< Of a page of a browser: where what it names lies.
-  std::function<std::string()> text;  ///< The value as shown; of a check "1" or "0", of options the number from 0.
+  std::vector<int> optionValues;           ///< What the node stores for each; empty for the options' numbers.
+  std::string key;                         ///< Of the node, so that a finding leads here.
+  const CYbSEKvfBase* node = nullptr;      ///< That holds the key; null where it changes.
+  const CYbSEKvfBase* pageNode = nullptr;  ///< Of the form, by whose place in the tree the rules are asked.
+  Host::FileQuestion fileQuestion;         ///< Of a file name.
+  std::string folder;                      ///< Of a page of a browser: where what it names lies.
+  std::function<std::string()> text;       ///< The value as shown; of a check "1" or "0", of options the number from 0.
   /// Takes a typed value; gives what was expected when it is none, and then changes nothing.
   std::function<std::string(const std::string&)> enter;
   std::function<void()> press;  ///< Of a button.
@@ -93,6 +95,8 @@ class Control {
   /// What a taken value brings with it; gives further hints of the change.
   std::function<int()> then;
   Condition enabledWhen, shownWhen;
+  /// What the value belongs to, where that changes: what was refused is another one's then.
+  std::function<std::uintptr_t()> subject;
   bool beside = false;  ///< Stands in the same row as the control before it.
   int hint = kDataChanged;
   bool revalidates = false;         ///< Other nodes' rules depend on the value.
@@ -104,8 +108,8 @@ class Control {
   std::function<MapContent()> map;       ///< What a map shows now.
   std::function<SeriesContent()> chart;  ///< What a chart shows now.
 
-  bool IsEnabled() const { return enabledWhen.Holds(*node); }
-  bool IsShown() const { return shownWhen.Holds(*node); }
+  bool IsEnabled() const { return enabledWhen.Holds(*pageNode); }
+  bool IsShown() const { return shownWhen.Holds(*pageNode); }
   std::string Text() const { return text ? text() : std::string(); }
   std::vector<std::string> Options() const { return options ? options() : std::vector<std::string>(); }
   FieldUnit NumberUnit() const { return {unit, itemType, displayUnits}; }
@@ -208,6 +212,9 @@ class PageForm {
   std::shared_ptr<PageForm> NewSubForm(CYbSEKvfBase& node) { return std::make_shared<PageForm>(node, keys_); }
   Control& SubForms(std::vector<std::shared_ptr<PageForm>> forms, std::function<int()> current);
 
+  /// A control of that kind, whose value is bound by who adds it.
+  Control& Bare(ControlKind kind, std::string label) { return Add(kind, std::move(label)); }
+
   CYbSEKvfBase& Node() const { return node_; }
   BoundKeys& Keys() const { return *keys_; }
   const std::vector<std::unique_ptr<Control>>& Controls() const { return controls_; }
@@ -219,6 +226,8 @@ class PageForm {
   /// Shows and takes quantities in these units from now on, also in groups, sub-forms and tables; they are asked each
   /// time and must outlive the form. Null for base units.
   void SetDisplayUnits(const DisplayUnits* units);
+  /// Lets the tables ask their rules anew.
+  void Follow();
 
   /// How dates are shown and typed.
   static constexpr std::string_view kDateFormat = "%Y/%m/%d  %H:%M";

@@ -7,116 +7,230 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
-#include "forms/entry.h"
 #include "platform/text.h"
 
 namespace tervane {
 
-std::string CellText(int value) { return std::to_string(value); }
-std::string CellText(float value) { return ShortestNumber(value); }
-std::string CellText(double value) { return ShortestNumber(value); }
-std::string CellText(const std::string& value) { return value; }
-std::string CellText(const FileName& value) { return value.Text(); }
+// ---- Columns and rows that are there
 
-std::string TakeCell(int& value, const std::string& typed, const CYbSEKvfBase&) { return EnterValue(value, typed); }
-std::string TakeCell(float& value, const std::string& typed, const CYbSEKvfBase&) { return EnterValue(value, typed); }
-std::string TakeCell(double& value, const std::string& typed, const CYbSEKvfBase&) { return EnterValue(value, typed); }
-std::string TakeCell(std::string& value, const std::string& typed, const CYbSEKvfBase&) {
-  return EnterValue(value, typed);
-}
-std::string TakeCell(FileName& value, const std::string& typed, const CYbSEKvfBase& item) {
-  return EnterValue(value, typed, item);
+TableColumn& TableForm::AddColumn(std::string head) {
+  TableColumn& column = columns_.emplace_back();
+  column.head = std::move(head);
+  shown_.push_back({&column, 1});
+  return column;
 }
 
-const TableColumn* TableForm::ColumnAt(int column) const {
-  return column >= 1 && column <= static_cast<int>(columns_.size()) ? &columns_[static_cast<std::size_t>(column - 1)]
-                                                                    : nullptr;
+void TableForm::ClearColumns() {
+  shown_.clear();
+  columns_.clear();
 }
+
+void TableForm::ItemName(std::string one, std::string many) {
+  itemNames_ = many.empty() ? one + "s" : std::move(many);
+  itemName_ = std::move(one);
+}
+
+void TableForm::Forget() {
+  for (const TableColumn& column : columns_)
+    if (column.forget) column.forget();
+}
+
+void TableForm::FollowColumns() {
+  shown_.clear();
+  // A head goes over the columns that are there of those behind it.
+  std::size_t covered = 0, bearer = 0;
+  for (std::size_t i = 0; i < columns_.size(); ++i) {
+    const TableColumn& column = columns_[i];
+    if (column.shownWhen && !column.shownWhen()) continue;
+    if (i < covered) {
+      ++shown_[bearer].headSpan;
+      shown_.push_back({&column, 0});
+    } else {
+      bearer = shown_.size();
+      covered = i + static_cast<std::size_t>(column.headSpan);
+      shown_.push_back({&column, 1});
+    }
+  }
+}
+
+void TableForm::FollowCurrent() {
+  const int count = RowCount();
+  if (identity_ && !(IsThere(current_) && rows_->Identity(current_) == identity_)) {
+    for (int row = 1; row <= count; ++row) {
+      if (rows_->Identity(row) != identity_) continue;
+      current_ = row;
+      break;
+    }
+  }
+  current_ = std::min(current_, count);
+  // What is only shown is chosen by the user alone.
+  if (current_ == 0 && count > 0 && !isShownOnly_) current_ = 1;
+  identity_ = current_ > 0 ? rows_->Identity(current_) : nullptr;
+}
+
+void TableForm::Follow() {
+  Forget();
+  FollowColumns();
+  FollowCurrent();
+}
+
+const TableColumn* TableForm::Column(int column) const {
+  return column >= 1 && column <= ColumnCount() ? shown_[static_cast<std::size_t>(column - 1)].column : nullptr;
+}
+
+bool TableForm::Choose(int row) {
+  if (!IsThere(row)) return false;
+  const bool isOther = current_ != row;
+  current_ = row;
+  identity_ = rows_->Identity(row);
+  if (chosen_) chosen_(row);
+  return chosen_ || (isOther && tellsCurrent_);
+}
+
+// ---- Cells
+
+CellKind TableForm::Kind(int row, const TableColumn& column) const {
+  return column.kind ? *column.kind : KindOf(column.get(row));
+}
+
+std::string TableForm::Cell(int row, const TableColumn& column) const {
+  return CellText(column.get(row), UnitOf(column));
+}
+
+std::string TableForm::ShownCell(int row, const TableColumn& column) const {
+  if (Kind(row, column) != CellKind::Choice) return CellText(column.get(row), UnitOf(column), column.format);
+  std::string stored = Cell(row, column);
+  const CellChoices choices = Choices(row, column);
+  const int place = choices.PlaceOf(stored);
+  return place >= 0 ? choices[static_cast<std::size_t>(place)].text : std::move(stored);
+}
+
+bool TableForm::IsReadOnly(int row, const TableColumn& column) const {
+  if (!column.set || (column.readOnly && column.readOnly(row))) return true;
+  return !column.kind && std::holds_alternative<NoCell>(column.get(row));
+}
+
+CellChoices TableForm::Choices(int row, const TableColumn& column) const {
+  return column.rowChoices ? column.rowChoices(row) : column.choices;
+}
+
+std::string TableForm::ToolTip(int row, const TableColumn& column) const {
+  std::string own = column.cellToolTip ? column.cellToolTip(row) : std::string();
+  return own.empty() ? column.toolTip : own;
+}
+
+std::string TableForm::Set(int row, const TableColumn& column, const CellValue& value) {
+  std::string refusal = column.set(row, value);
+  Forget();
+  return refusal;
+}
+
+std::string TableForm::Enter(int row, const TableColumn& column, const std::string& typed) {
+  CellValue value = column.get(row);
+  if (IsReadOnly(row, column)) {
+    const auto* none = std::get_if<NoCell>(&value);
+    return none ? none->why : NoCell().why;
+  }
+  if (Kind(row, column) == CellKind::Choice) {
+    const CellChoices choices = Choices(row, column);
+    if (choices.empty()) return "there is nothing to choose from";
+    if (choices.PlaceOf(typed) < 0) return fmt::format("one of {} was expected", fmt::join(choices.ShownTexts(), ", "));
+  }
+  const CYbSEKvfBase* node = rows_->Node(row);
+  std::string expected = EnterCell(value, typed, UnitOf(column), node ? node : node_);
+  return expected.empty() ? Set(row, column, value) : expected;
+}
+
+// ---- The same by numbers
 
 std::string TableForm::Cell(int row, int column) const {
-  CYbSEKvfBase* item = list_.GetItemNode(row);
-  const TableColumn* shown = ColumnAt(column);
-  if (!item || !shown) return {};
-  if (!shown->HasUnit()) return shown->text(*item);
-  return std::visit([&](auto* number) { return ShownNumber(*number, UnitOf(*shown)); }, shown->number(*item));
-}
-
-std::string TableForm::Enter(int row, int column, const std::string& typed) {
-  CYbSEKvfBase* item = list_.GetItemNode(row);
-  const TableColumn* target = ColumnAt(column);
-  if (!item || !target) return "there is no such cell";
-  if (IsReadOnly(row, column)) return "the cell cannot be changed";
-  if (!target->HasUnit()) return target->enter(*item, typed);
-  return std::visit([&](auto* number) { return EnterNumber(*number, typed, UnitOf(*target)); }, target->number(*item));
-}
-
-// ---- What a view asks
-
-CellKind TableForm::Kind(int row, int column) const {
-  CYbSEKvfBase* item = list_.GetItemNode(row);
-  const TableColumn* shown = ColumnAt(column);
-  return item && shown && shown->kind ? shown->kind(*item) : CellKind::Text;
-}
-
-bool TableForm::IsReadOnly(int row, int column) const {
-  CYbSEKvfBase* item = list_.GetItemNode(row);
-  const TableColumn* shown = ColumnAt(column);
-  return !item || !shown || isShownOnly_ || (shown->readOnly && shown->readOnly(*item));
-}
-
-std::string TableForm::Icon(int row, int column) const {
-  CYbSEKvfBase* item = list_.GetItemNode(row);
-  const TableColumn* shown = ColumnAt(column);
-  return item && shown && shown->icon ? shown->icon(*item) : std::string();
-}
-
-bool TableForm::IsLink(int row, int column) const {
-  const TableColumn* shown = ColumnAt(column);
-  return list_.GetItemNode(row) && shown && shown->press;
-}
-
-bool TableForm::Press(int row, int column) const {
-  if (!IsLink(row, column)) return false;
-  ColumnAt(column)->press(*list_.GetItemNode(row));
-  return true;
-}
-
-const std::string& TableForm::ToolTip(int column) const {
-  static const std::string none;
-  const TableColumn* shown = ColumnAt(column);
-  return shown ? shown->toolTip : none;
-}
-
-const std::vector<std::string>& TableForm::Choices(int column) const {
-  static const std::vector<std::string> none;
-  const TableColumn* shown = ColumnAt(column);
-  return shown ? shown->choices : none;
+  const TableColumn* shown = Column(column);
+  return shown && IsThere(row) ? Cell(row, *shown) : std::string();
 }
 
 std::string TableForm::ShownCell(int row, int column) const {
-  std::string cell = Cell(row, column);
-  const std::vector<std::string>& choices = Choices(column);
-  for (std::size_t i = 0; i < choices.size(); ++i)
-    if (cell == std::to_string(i)) return choices[i];
-  return cell;
+  const TableColumn* shown = Column(column);
+  return shown && IsThere(row) ? ShownCell(row, *shown) : std::string();
+}
+
+CellKind TableForm::Kind(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  return shown && IsThere(row) ? Kind(row, *shown) : CellKind::Text;
+}
+
+bool TableForm::IsReadOnly(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  return !shown || !IsThere(row) || isShownOnly_ || IsReadOnly(row, *shown);
+}
+
+bool TableForm::IsGrey(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  if (!shown || !IsThere(row)) return false;
+  // Of a table that is only shown nothing could stand out.
+  if (shown->press) return shown->readOnly && shown->readOnly(row);
+  return !isShownOnly_ && IsReadOnly(row, *shown);
+}
+
+CellChoices TableForm::Choices(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  return shown && IsThere(row) ? Choices(row, *shown) : CellChoices();
+}
+
+std::string TableForm::ToolTip(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  return shown && IsThere(row) ? ToolTip(row, *shown) : std::string();
+}
+
+std::string TableForm::Icon(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  return shown && IsThere(row) && shown->icon ? shown->icon(row) : std::string();
+}
+
+bool TableForm::IsLink(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  return shown && IsThere(row) && shown->press && !shown->IsButton();
+}
+
+bool TableForm::Press(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  if (!shown || !IsThere(row) || !shown->press || IsGrey(row, column)) return false;
+  shown->press(row);
+  return true;
+}
+
+std::string TableForm::Enter(int row, int column, const std::string& typed) {
+  const TableColumn* shown = Column(column);
+  if (!shown || !IsThere(row)) return "there is no such cell";
+  return isShownOnly_ ? NoCell().why : Enter(row, *shown, typed);
 }
 
 std::string TableForm::Head(int column) const {
-  const TableColumn* shown = ColumnAt(column);
+  const TableColumn* shown = Column(column);
   if (!shown) return {};
   const std::string unit = UnitOf(*shown).Text();
   if (unit.empty()) return shown->head;
   return unit.starts_with('[') ? fmt::format("{} {}", shown->head, unit) : fmt::format("{} [{}]", shown->head, unit);
 }
 
+int TableForm::HeadSpan(int column) const {
+  return Column(column) ? shown_[static_cast<std::size_t>(column - 1)].headSpan : 1;
+}
+
 std::vector<UnitChoice> TableForm::UnitChoices(int column) const {
-  const TableColumn* shown = ColumnAt(column);
+  const TableColumn* shown = Column(column);
   return shown ? UnitOf(*shown).Choices() : std::vector<UnitChoice>();
 }
 
-void TableForm::ItemName(std::string one, std::string many) {
-  itemNames_ = many.empty() ? one + "s" : std::move(many);
-  itemName_ = std::move(one);
+std::string TableForm::RowHead(int row) const {
+  if (!IsThere(row)) return {};
+  return rowHead_ ? rowHead_(row) : std::to_string(row);
+}
+
+// ---- Rows
+
+bool TableForm::Allows(RowAction action) const {
+  if (isShownOnly_ || keepsRows_ || !rows_->CanChange()) return false;
+  return !keepsOrder_ || action == RowAction::Insert || action == RowAction::Delete;
 }
 
 std::string TableForm::ActionName(RowAction action, int rows) const {
@@ -134,193 +248,35 @@ std::string TableForm::ActionName(RowAction action, int rows) const {
   return items;
 }
 
-// ---- Many cells at once
-
-namespace {
-
-std::string Quoted(const std::string& cell) {
-  if (cell.find_first_of("\t\n\r\"") == std::string::npos) return cell;
-  return '"' + Replaced(cell, "\"", "\"\"") + '"';
-}
-
-bool EndsCell(std::string_view rest) {
-  return rest.empty() || rest.front() == '\t' || rest.front() == '\n' || rest.front() == '\r';
-}
-
-/// Takes a cell from the front of the text. A quote that nobody closes before the cell ends is a quote and no more.
-std::string TakePastedCell(std::string_view& text) {
-  if (text.starts_with('"')) {
-    std::string cell;
-    for (std::size_t at = 1; at < text.size(); ++at) {
-      if (text[at] != '"') {
-        cell += text[at];
-      } else if (text.substr(at + 1).starts_with('"')) {
-        cell += text[at++];
-      } else if (EndsCell(text.substr(at + 1))) {
-        text.remove_prefix(at + 1);
-        return cell;
-      } else {
-        break;
-      }
-    }
+void TableForm::MoveCurrent(RowAction action, int first, int last) {
+  const int rows = last - first + 1;
+  switch (action) {
+    case RowAction::Insert:
+      if (current_ >= first) current_ += rows;
+      break;
+    case RowAction::Delete:
+      if (current_ > last)
+        current_ -= rows;
+      else if (current_ >= first)
+        current_ = std::min(first, RowCount());
+      break;
+    case RowAction::MoveUp:
+      if (current_ == first - 1)
+        current_ = last;
+      else if (current_ >= first && current_ <= last)
+        --current_;
+      break;
+    case RowAction::MoveDown:
+      if (current_ == last + 1)
+        current_ = first;
+      else if (current_ >= first && current_ <= last)
+        ++current_;
+      break;
   }
-  const std::size_t end = std::min(text.find_first_of("\t\n\r"), text.size());
-  std::string cell(text.substr(0, end));
-  text.remove_prefix(end);
-  return cell;
+  Forget();
+  identity_ = IsThere(current_) ? rows_->Identity(current_) : nullptr;
+  FollowCurrent();
 }
-
-using PastedRows = std::vector<std::vector<std::string>>;
-
-PastedRows ParsePasted(std::string_view text) {
-  PastedRows rows;
-  while (!text.empty()) {
-    std::vector<std::string>& row = rows.emplace_back();
-    row.push_back(TakePastedCell(text));
-    while (text.starts_with('\t')) {
-      text.remove_prefix(1);
-      row.push_back(TakePastedCell(text));
-    }
-    text.remove_prefix(text.starts_with("\r\n") ? 2 : text.empty() ? 0 : 1);
-  }
-  return rows;
-}
-
-/// The number of a choice by its text or number; -1 when it is none.
-int ChoiceNumber(const std::vector<std::string>& choices, std::string_view shown) {
-  for (std::size_t i = 0; i < choices.size(); ++i)
-    if (EqualIgnoringCase(Trimmed(choices[i]), Trimmed(shown))) return static_cast<int>(i);
-  int number = -1;
-  const bool isChoice =
-      EnterValue(number, std::string(shown)).empty() && number >= 0 && number < static_cast<int>(choices.size());
-  return isChoice ? number : -1;
-}
-
-/// 1 or 0 by the words for them; -1 when it is none.
-int CheckNumber(std::string_view shown) {
-  constexpr std::string_view kWords[][4] = {{"0", "false", "no", "off"}, {"1", "true", "yes", "on"}};
-  for (int number = 0; number < 2; ++number)
-    for (const std::string_view word : kWords[number])
-      if (EqualIgnoringCase(Trimmed(shown), word)) return number;
-  return -1;
-}
-
-}  // namespace
-
-std::string CellsResult::Message() const {
-  std::string message;
-  for (const std::string& reason : reasons) message += (message.empty() ? "" : "\n") + reason;
-  const int more = refused - static_cast<int>(reasons.size());
-  return more > 0 ? fmt::format("{}\nand {} more", message, more) : message;
-}
-
-void TableForm::Refuse(CellsResult& result, int row, int column, const std::string& expected) const {
-  ++result.refused;
-  if (result.reasons.size() >= CellsResult::kMostReasons) return;
-  const TableColumn* target = ColumnAt(column);
-  const std::string head = target ? Replaced(target->head, "\n", " ") : fmt::format("column {}", column);
-  result.reasons.push_back(fmt::format("row {}, {}: {}", row, head, expected));
-}
-
-std::string TableForm::EnterShown(int row, int column, const std::string& shown) {
-  const CellKind kind = Kind(row, column);
-  if (IsReadOnly(row, column) || (kind != CellKind::Choice && kind != CellKind::Check))
-    return Enter(row, column, shown);
-  const int number = kind == CellKind::Choice ? ChoiceNumber(Choices(column), shown) : CheckNumber(shown);
-  if (number >= 0) return Enter(row, column, std::to_string(number));
-  return kind == CellKind::Choice ? fmt::format("one of {} was expected", fmt::join(Choices(column), ", "))
-                                  : "1 or 0, true or false, yes or no, on or off was expected";
-}
-
-void TableForm::Put(CellsResult& result, int row, int column, const std::string& shown) {
-  const bool exists = ColumnAt(column) && row <= RowCount();
-  const bool changes = !exists || ShownCell(row, column) != shown;
-  const std::string expected = !ColumnAt(column) ? fmt::format("the table has {} columns", columns_.size())
-                               : !exists         ? "the list takes no further rows"
-                               : changes         ? EnterShown(row, column, shown)
-                                                 : std::string();
-  if (!expected.empty()) return Refuse(result, row, column, expected);
-  ++result.taken;
-  if (changes) result.hint |= kDataChanged;
-}
-
-std::string TableForm::CopyText(const CellRange& cells) const {
-  const int lastColumn = std::min(cells.lastColumn, static_cast<int>(columns_.size()));
-  std::string text;
-  for (int row = std::max(cells.firstRow, 1); row <= std::min(cells.lastRow, RowCount()); ++row) {
-    for (int column = std::max(cells.firstColumn, 1); column <= lastColumn; ++column)
-      text += Quoted(ShownCell(row, column)) + (column < lastColumn ? "\t" : "\n");
-  }
-  return text;
-}
-
-CellsResult TableForm::Paste(const CellRange& selected, std::string_view text) {
-  CellsResult result;
-  const PastedRows pasted = ParsePasted(text);
-  if (pasted.empty()) return result;
-  const int before = RowCount();
-  const int firstRow = std::clamp(selected.firstRow, 1, before + 1);
-  const int firstColumn = std::max(selected.firstColumn, 1);
-  const bool fills = pasted.size() == 1 && pasted.front().size() == 1;
-  const int rows = fills ? std::max(selected.lastRow - firstRow + 1, 1) : static_cast<int>(pasted.size());
-  const int needed = std::min(firstRow + rows - 1, kLargestItemCount);
-  for (int count = RowCount(); count < needed && RowCount() == count; ++count) list_.AddItemNode();
-  result.cells = OneCell(firstRow, firstColumn);
-  int lastTaken = before;
-  for (int i = 0; i < rows; ++i) {
-    const std::vector<std::string>& row = pasted[fills ? 0 : static_cast<std::size_t>(i)];
-    const int columns = fills ? std::max(selected.lastColumn - firstColumn + 1, 1) : static_cast<int>(row.size());
-    const int taken = result.taken;
-    for (int j = 0; j < columns; ++j)
-      Put(result, firstRow + i, firstColumn + j, row[fills ? 0 : static_cast<std::size_t>(j)]);
-    if (result.taken > taken) lastTaken = std::max(lastTaken, firstRow + i);
-    result.cells.lastRow = firstRow + i;
-    result.cells.lastColumn = std::max(result.cells.lastColumn, firstColumn + columns - 1);
-  }
-  // A new row that took nothing would be no more than an accident.
-  for (int row = RowCount(); row > lastTaken; --row) list_.DeleteItem(row, 1);
-  if (RowCount() > before) result.hint |= kItemAdded | (before == 0 ? kOrderChanged : 0);
-  result.cells.lastRow = std::min(result.cells.lastRow, RowCount());
-  result.cells.lastColumn = std::min(result.cells.lastColumn, static_cast<int>(columns_.size()));
-  return result;
-}
-
-CellsResult TableForm::FillDown(const CellRange& cells) {
-  CellsResult result;
-  result.cells = cells;
-  CYbSEKvfBase* source = list_.GetItemNode(cells.firstRow);
-  if (!source) return result;
-  for (int row = cells.firstRow + 1; row <= std::min(cells.lastRow, RowCount()); ++row) {
-    for (int column = cells.firstColumn; column <= cells.lastColumn; ++column) {
-      Put(result, row, column, ShownCell(cells.firstRow, column));
-      const TableColumn* target = ColumnAt(column);
-      if (!target || !target->HasUnit() || IsReadOnly(row, column)) continue;
-      // The shown text of a converted number does not hold all of its digits.
-      std::visit(
-          [&]<class Real>(Real* number) {
-            const Real given = *std::get<Real*>(target->number(*source));
-            if (*number != given) result.hint |= kDataChanged;
-            *number = given;
-          },
-          target->number(*list_.GetItemNode(row)));
-    }
-  }
-  return result;
-}
-
-CellsResult TableForm::Clear(const CellRange& cells) {
-  CellsResult result;
-  result.cells = cells;
-  for (int row = std::max(cells.firstRow, 1); row <= std::min(cells.lastRow, RowCount()); ++row) {
-    for (int column = cells.firstColumn; column <= cells.lastColumn; ++column) {
-      const CellKind kind = Kind(row, column);
-      if (ColumnAt(column) && (kind == CellKind::Text || kind == CellKind::File)) Put(result, row, column, {});
-    }
-  }
-  return result;
-}
-
-// ---- Rows
 
 int TableForm::ChangeRows(RowAction action, int first, int last) {
   switch (action) {
@@ -337,65 +293,61 @@ int TableForm::ChangeRows(RowAction action, int first, int last) {
 }
 
 int TableForm::ChangeRow(RowAction action, int row) {
-  if (!list_.GetItemNode(row)) return 0;
+  if (!IsThere(row) || !Allows(action)) return 0;
+  int hint = 0;
   switch (action) {
     case RowAction::Insert:
-      list_.InsertItem(row, 1);
-      return kItemAdded;
+      rows_->Insert(row);
+      hint = kItemAdded;
+      break;
     case RowAction::Delete:
-      list_.DeleteItem(row, 1);
-      return kItemDeleted;
+      rows_->Delete(row);
+      hint = kItemDeleted;
+      break;
     case RowAction::MoveUp:
-      return list_.MoveItemUp(row, 1) ? kOrderChanged : 0;
+      hint = rows_->MoveUp(row) ? kOrderChanged : 0;
+      break;
     case RowAction::MoveDown:
-      return list_.MoveItemDown(row, 1) ? kOrderChanged : 0;
+      hint = rows_->MoveDown(row) ? kOrderChanged : 0;
+      break;
   }
-  return 0;
+  if (hint) MoveCurrent(action, row, row);
+  return hint;
 }
 
 int TableForm::InsertRows(int first, int last) {
+  if (!Allows(RowAction::Insert)) return 0;
   if (first < 1) {
-    list_.AddItemNode();
-    return kItemAdded | (list_.GetItemCount() == 1 ? kOrderChanged : 0);
+    rows_->Add();
+    Forget();
+    FollowCurrent();
+    return kItemAdded | (RowCount() == 1 ? kOrderChanged : 0);
   }
-  for (int row = first; row <= last; ++row) list_.InsertItem(first, 1);
+  for (int row = first; row <= last; ++row) rows_->Insert(first);
+  MoveCurrent(RowAction::Insert, first, last);
   return kItemAdded | (first == 1 ? kOrderChanged : 0);
 }
 
 int TableForm::DeleteRows(int first, int last) {
-  if (first < 1 || first > list_.GetItemCount()) return 0;
-  for (int row = first; row <= last; ++row) list_.DeleteItem(first, 1);
+  if (first < 1 || first > RowCount() || !Allows(RowAction::Delete)) return 0;
+  last = std::min(last, RowCount());
+  for (int row = first; row <= last; ++row) rows_->Delete(first);
+  MoveCurrent(RowAction::Delete, first, last);
   return kItemDeleted;
 }
 
 int TableForm::MoveRowsUp(int first, int last) {
-  if (first <= 1) return 0;
-  for (int row = first; row <= last; ++row) list_.MoveItemUp(row, 1);
+  if (first <= 1 || !Allows(RowAction::MoveUp)) return 0;
+  for (int row = first; row <= last; ++row) rows_->MoveUp(row);
+  MoveCurrent(RowAction::MoveUp, first, last);
   return kOrderChanged;
 }
 
 int TableForm::MoveRowsDown(int first, int last) {
-  if (first < 1 || last >= list_.GetItemCount()) return 0;
-  for (int row = last; row >= first; --row) list_.MoveItemDown(row, 1);
+  if (first < 1 || last >= RowCount() || !Allows(RowAction::MoveDown)) return 0;
+  for (int row = last; row >= first; --row) rows_->MoveDown(row);
+  MoveCurrent(RowAction::MoveDown, first, last);
   return kOrderChanged;
-}
-
-std::string TableText(const TableForm& table, int level) {
-  const std::string indent(2 * static_cast<std::size_t>(level), ' ');
-  std::string text = indent;
-  for (const TableColumn& column : table.Columns()) {
-    text += fmt::format("{}\"{}\"", &column == table.Columns().data() ? "" : " | ",
-                        Replaced(table.Head(static_cast<int>(&column - table.Columns().data()) + 1), "\n", " "));
-    if (!column.choices.empty()) text += fmt::format(" of [{}]", fmt::join(column.choices, " | "));
-  }
-  text += '\n';
-  for (int row = 1; row <= table.RowCount(); ++row) {
-    text += indent;
-    for (int column = 1; column <= static_cast<int>(table.Columns().size()); ++column)
-      text += fmt::format("{}{}", column == 1 ? "" : " | ", table.ShownCell(row, column));
-    text += '\n';
-  }
-  return text;
 }
 
 }  // namespace tervane

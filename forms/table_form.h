@@ -1,19 +1,23 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
+
+// A table of a page without its class of rows: what views, texts and the clipboard ask. Pages make tables with
+// `forms/table_of.h`.
 #pragma once
 
+#include <cstdint>
+#include <deque>
 #include <functional>
+#include <memory>
+#include <optional>
 #include <string>
-#include <variant>
 #include <vector>
 
-#include "core/list.h"
+#include "forms/cell_value.h"
 #include "forms/page_form.h"
+#include "forms/table_rows.h"
 
 namespace tervane {
-
-/// How a cell is edited.
-enum class CellKind { Text, Number, Integer, Check, Choice, File };
 
 /// A rectangle of cells, all numbers from 1 and inclusive.
 struct CellRange {
@@ -37,134 +41,145 @@ struct CellsResult {
   static constexpr std::size_t kMostReasons = 10;
 };
 
-/// A column of a table over a list: what its cells show and take, by the row's item.
+/// A column: what its cells show and take, by the number of the row, which is there.
 struct TableColumn {
   std::string head;
   int width = 100;
-  std::function<CellKind(CYbSEKvfBase& item)> kind;
-  std::function<std::string(CYbSEKvfBase& item)> text;
-  /// Takes a typed value; gives what was expected when it is none.
-  std::function<std::string(CYbSEKvfBase& item, const std::string& typed)> enter;
-  std::vector<std::string> choices;
-  std::function<bool(CYbSEKvfBase& item)> readOnly;
-  std::string toolTip;
-  std::string unit;  ///< A fixed unit of the numbers, as of a control.
-  int itemType = 0;  ///< The numbers are quantities of that item type; 0 for none.
-  /// The number of a cell, where the column holds numbers.
-  std::function<std::variant<float*, double*>(CYbSEKvfBase&)> number;
-  /// The name of an icon in front of a cell's text; empty for none.
-  std::function<std::string(CYbSEKvfBase& item)> icon;
-  /// What a click on a cell does, which is shown as a link.
-  std::function<void(CYbSEKvfBase& item)> press;
+  int headSpan = 1;                 ///< Over how many columns the head goes, this one included.
+  std::string toolTip;              ///< Of the head, and of the cells that have none of their own.
+  std::string unit;                 ///< A fixed unit of the numbers, as of a control.
+  int itemType = 0;                 ///< The numbers are quantities of that item type; 0 for none.
+  std::string format;               ///< A printf format of one double in which numbers are shown, such as "%.6g".
+  int hint = kDataChanged;          ///< Of a change in a cell.
+  Host::FileQuestion fileQuestion;  ///< Of names of files.
+  std::optional<CellKind> kind;     ///< Absent where it follows the value of each row.
+  CellChoices choices;              ///< Of a choice, the same in all rows.
+  std::function<CellChoices(int row)> rowChoices;  ///< Of a choice that differs from row to row.
+  /// The value of a cell, or the text of a button.
+  std::function<CellValue(int row)> get;
+  /// Takes a value of the type that `get` gives; gives why it is refused. Absent where nothing can be changed.
+  std::function<std::string(int row, const CellValue& value)> set;
+  std::function<bool(int row)> readOnly;  ///< Of a button: it cannot be pressed.
+  std::function<bool()> shownWhen;        ///< Absent columns have no number; asked by `TableForm::Follow`.
+  std::function<std::string(int row)> cellToolTip;
+  /// The name of an icon in front of a cell's text, or on a button; empty for none.
+  std::function<std::string(int row)> icon;
+  /// What a click on a cell does: on a button, or on a text that is shown as a link.
+  std::function<void(int row)> press;
+  /// Forgets what was computed from the rows.
+  std::function<void()> forget;
 
-  /// The numbers are shown and typed in a unit, which then goes before `text` and `enter`.
-  bool HasUnit() const { return number && (itemType != 0 || !unit.empty()); }
+  bool IsButton() const { return kind == CellKind::Button; }
 };
 
-// A value in a cell: as it is shown, and typed. A value that the cell refuses is told and does not reach the item.
-
-std::string CellText(int value);
-std::string CellText(float value);
-std::string CellText(double value);
-std::string CellText(const std::string& value);
-std::string CellText(const FileName& value);
-std::string TakeCell(int& value, const std::string& typed, const CYbSEKvfBase& item);
-std::string TakeCell(float& value, const std::string& typed, const CYbSEKvfBase& item);
-std::string TakeCell(double& value, const std::string& typed, const CYbSEKvfBase& item);
-std::string TakeCell(std::string& value, const std::string& typed, const CYbSEKvfBase& item);
-std::string TakeCell(FileName& value, const std::string& typed, const CYbSEKvfBase& item);
-
-/// A table over a list: one row for each item. Inserting, deleting and moving rows come with it.
+/// A table: one row for each item of a list or each of some values. Inserting, deleting and moving rows come with it.
+/// Rows and columns count from 1; absent columns do not count. What is not there gives nothing, a text, and is read
+/// only.
 class TableForm {
  public:
-  explicit TableForm(CYbSEKvfListBaseInterface& list) : list_(list) {}
+  explicit TableForm(std::shared_ptr<TableRows> rows) : rows_(std::move(rows)) {}
+  virtual ~TableForm() = default;
 
-  TableColumn& Add(std::string head, int width) {
-    TableColumn& column = columns_.emplace_back();
-    column.head = std::move(head);
-    column.width = width;
-    return column;
-  }
-  /// A column over a member of the items, which are of one class: `get(item)` gives a reference to it.
-  template <class Item, class Get>
-  TableColumn& Column(std::string head, int width, CellKind kind, Get get) {
-    TableColumn& column = Add(std::move(head), width);
-    column.kind = [kind](CYbSEKvfBase&) { return kind; };
-    column.text = [get](CYbSEKvfBase& item) { return CellText(get(static_cast<Item&>(item))); };
-    column.enter = [get](CYbSEKvfBase& item, const std::string& typed) {
-      return TakeCell(get(static_cast<Item&>(item)), typed, item);
-    };
-    if constexpr (std::is_floating_point_v<std::remove_reference_t<decltype(get(std::declval<Item&>()))>>)
-      column.number = [get](CYbSEKvfBase& item) -> std::variant<float*, double*> {
-        return &get(static_cast<Item&>(item));
-      };
-    return column;
-  }
-  /// The same for a choice, stored by its number from 0.
-  template <class Item, class Get>
-  TableColumn& Choice(std::string head, int width, Get get, std::vector<std::string> choices) {
-    TableColumn& column = Column<Item>(std::move(head), width, CellKind::Choice, get);
-    column.choices = std::move(choices);
-    return column;
-  }
+  // ---- Making one
 
+  TableColumn& AddColumn(std::string head);
+  /// Takes all columns away, for a table whose columns follow what it shows.
+  void ClearColumns();
   /// What a row is called in the names of actions: "Parameter" gives "Insert Parameter", "Delete 3 Parameters".
   /// `many` is said where an s does not make the plural.
   void ItemName(std::string one, std::string many = {});
+  /// Nothing can be changed: the rows are made by the page.
+  void ShowOnly() { isShownOnly_ = true; }
+  /// Cells can be changed, but no rows come, go or move.
+  void KeepRows() { keepsRows_ = true; }
+  /// Rows come and go, but none is moved by the user.
+  void KeepOrder() { keepsOrder_ = true; }
+  /// Told the row that the user makes the current one.
+  void OnChoose(std::function<void(int row)> chosen) { chosen_ = std::move(chosen); }
+  /// Something on the page shows the current row, and so follows when it becomes another one.
+  void TellCurrentRow() { tellsCurrent_ = true; }
+  /// Texts in front of the rows, instead of their numbers.
+  void RowHeads(std::function<std::string(int row)> head) { rowHead_ = std::move(head); }
+  void SetDisplayUnits(const DisplayUnits* units) { displayUnits_ = units; }
+  /// The node of the page, whose folder names of files are relative to where rows are no nodes.
+  void SetNode(const CYbSEKvfBase* node) { node_ = node; }
+
+  // ---- What it shows
+
+  /// Asks anew which columns there are, and which row is the current one when rows came, went or moved.
+  void Follow();
+  int RowCount() const { return rows_->Count(); }
+  int ColumnCount() const { return static_cast<int>(shown_.size()); }
+  /// A column that is there; null for other numbers.
+  const TableColumn* Column(int column) const;
+  /// All columns, also those that are absent now.
+  const std::deque<TableColumn>& Columns() const { return columns_; }
+  bool IsShownOnly() const { return isShownOnly_; }
+  bool Allows(RowAction action) const;
   /// "Insert Row", "Move 3 Rows Up".
   std::string ActionName(RowAction action, int rows) const;
-  void SetDisplayUnits(const DisplayUnits* units) { displayUnits_ = units; }
-  /// Nothing can be changed: the rows are made by the page. `chosen` is told the row of the current cell, from 1.
-  void ShowOnly(std::function<void(int row)> chosen = {}) {
-    isShownOnly_ = true;
-    chosen_ = std::move(chosen);
-  }
-  bool IsShownOnly() const { return isShownOnly_; }
-  void Choose(int row) const {
-    if (chosen_ && row >= 1 && row <= RowCount()) chosen_(row);
-  }
-  /// Takes all columns away, for a table whose columns follow what it shows.
-  void ClearColumns() { columns_.clear(); }
 
-  CYbSEKvfListBaseInterface& List() const { return list_; }
-  const std::vector<TableColumn>& Columns() const { return columns_; }
-  int RowCount() const { return list_.GetItemCount(); }
+  // What a view asks for each cell that it draws: none costs more with more rows.
 
-  /// The text of a cell, rows and columns from 1; empty where there is none.
+  /// The value of a cell as it is typed.
   std::string Cell(int row, int column) const;
-  /// Types into a cell; gives what was expected when the cell refuses it, and then nothing reached the item.
-  std::string Enter(int row, int column, const std::string& typed);
-
-  // What a view asks for each cell that it draws: none costs more with more rows. Rows and columns from 1; what is not
-  // there gives nothing, a text, and is read only.
-
+  /// The same as a person sees it: of a choice the chosen text, of a number its format.
+  std::string ShownCell(int row, int column) const;
   CellKind Kind(int row, int column) const;
   bool IsReadOnly(int row, int column) const;
-  const std::string& ToolTip(int column) const;
+  /// Whether the cell stands back behind others because it takes nothing.
+  bool IsGrey(int row, int column) const;
+  CellChoices Choices(int row, int column) const;
+  std::string ToolTip(int row, int column) const;
   std::string Icon(int row, int column) const;
   bool IsLink(int row, int column) const;
-  /// What a click on a cell does; false where that is nothing.
-  bool Press(int row, int column) const;
-  const std::vector<std::string>& Choices(int column) const;
-  /// The cell as a person sees it: of a choice the chosen text.
-  std::string ShownCell(int row, int column) const;
   /// The head of a column with the unit of its numbers: "Depth [m]".
   std::string Head(int column) const;
+  /// Over how many of the columns that are there the head goes; 0 below the head of a column before.
+  int HeadSpan(int column) const;
   /// The units that a user may choose for a column; empty where there is nothing to choose.
   std::vector<UnitChoice> UnitChoices(int column) const;
+  bool HasRowHeads() const { return rowHead_ != nullptr; }
+  std::string RowHead(int row) const;
 
-  // Many cells at once, as in a spreadsheet: rows of cells that tabs separate.
+  // The same of a column that need not be shown, for fields that stand below the table.
 
-  /// The cells as shown, rows ended by LF; a cell with a tab, line end or quote stands in quotes, its quotes doubled.
+  std::string ShownCell(int row, const TableColumn& column) const;
+  bool IsReadOnly(int row, const TableColumn& column) const;
+  CellChoices Choices(int row, const TableColumn& column) const;
+  std::string Enter(int row, const TableColumn& column, const std::string& typed);
+  std::string ToolTip(int row, const TableColumn& column) const;
+
+  // ---- Changing it
+
+  /// Types into a cell; gives what was expected when the cell refuses it, and then nothing reached the row.
+  std::string Enter(int row, int column, const std::string& typed);
+  /// What a click on a cell does; false where that is nothing.
+  bool Press(int row, int column) const;
+
+  /// The row of the current cell, 0 for none. It stays the same row when others come, go or move, as far as rows can
+  /// be told apart.
+  int CurrentRow() const { return current_; }
+  /// Tells the current row from others.
+  std::uintptr_t CurrentSubject() const {
+    return identity_ ? reinterpret_cast<std::uintptr_t>(identity_) : static_cast<std::uintptr_t>(current_);
+  }
+  /// Makes a row the current one; false where that changes nothing for anybody.
+  bool Choose(int row);
+
+  // Many cells at once, as in a spreadsheet: rows of cells that tabs separate. Buttons are passed over.
+
+  /// The cells as they are typed, choices by their texts, rows ended by LF; a cell with a tab, line end or quote stands
+  /// in quotes, its quotes doubled.
   std::string CopyText(const CellRange& cells) const;
   /// Writes such a text into the cells from the first of the selection on; one cell alone fills the whole selection.
-  /// Choices go by their shown text in any case, or by their number; checks take 1, true, yes, on and 0, false, no,
-  /// off. Rows are added at the end of the list. Cells that can be taken are; the others keep their values and are
+  /// Choices go by their shown text in any case, or by their stored value; checks take 1, true, yes, on and 0, false,
+  /// no, off. Rows are added at the end of the list. Cells that can be taken are; the others keep their values and are
   /// told.
   CellsResult Paste(const CellRange& selected, std::string_view text);
-  /// Writes the cells of the first row into those below them.
+  /// Writes the cells of the first row into those below them, but in columns that are computed.
   CellsResult FillDown(const CellRange& cells);
-  /// Empties texts and file names; other cells, which have no empty value, are left alone.
+  /// Empties texts and file names; cells that have no empty value or cannot be changed are left alone.
   CellsResult Clear(const CellRange& cells);
 
   /// The row of the current cell alone; gives the hint of the change, 0 when nothing was changed.
@@ -180,23 +195,49 @@ class TableForm {
   int MoveRowsDown(int first, int last);
 
  private:
-  const TableColumn* ColumnAt(int column) const;
+  bool IsThere(int row) const { return row >= 1 && row <= RowCount(); }
   FieldUnit UnitOf(const TableColumn& column) const { return {column.unit, column.itemType, displayUnits_}; }
+  CellKind Kind(int row, const TableColumn& column) const;
+  std::string Cell(int row, const TableColumn& column) const;
+  std::string Set(int row, const TableColumn& column, const CellValue& value);
+  /// Puts the current row where its row went.
+  void MoveCurrent(RowAction action, int first, int last);
+  void Forget();
+  void FollowColumns();
+  void FollowCurrent();
+
+  // Of many cells.
+
   /// Types the shown text of a cell; gives what was expected.
   std::string EnterShown(int row, int column, const std::string& shown);
   /// The same, counted in the result.
   void Put(CellsResult& result, int row, int column, const std::string& shown);
+  /// Gives a cell the value of another one of its column, with all digits of a number.
+  void PutCopy(CellsResult& result, int row, int column, int sourceRow);
   void Refuse(CellsResult& result, int row, int column, const std::string& expected) const;
+  /// The columns from `first` on that a text is pasted into, as many as it needs or those up to the last.
+  std::vector<int> PastedColumns(int first, int last, std::size_t count) const;
 
-  CYbSEKvfListBaseInterface& list_;
-  std::vector<TableColumn> columns_;
+  std::shared_ptr<TableRows> rows_;
+  std::deque<TableColumn> columns_;
+  /// A column that is there, and over how many its head goes.
+  struct ShownColumn {
+    const TableColumn* column;
+    int headSpan;
+  };
+  std::vector<ShownColumn> shown_;
   const DisplayUnits* displayUnits_ = nullptr;
+  const CYbSEKvfBase* node_ = nullptr;
   std::string itemName_ = "Row", itemNames_ = "Rows";
-  bool isShownOnly_ = false;
+  bool isShownOnly_ = false, keepsRows_ = false, keepsOrder_ = false;
+  std::function<std::string(int)> rowHead_;
   std::function<void(int)> chosen_;
+  bool tellsCurrent_ = false;
+  int current_ = 0;
+  const void* identity_ = nullptr;  ///< Of the current row.
 };
 
 /// A table as text: heads and rows, cells separated by " | ".
-std::string TableText(const TableForm& table, int level);
+std::string TableText(TableForm& table, int level);
 
 }  // namespace tervane

@@ -157,7 +157,7 @@ Explanation WhyEnabled(CYbSEDocument& document, PageForm& form, const Control& c
   Explanation why{std::string(WithoutColon(Replaced(control.label.empty() ? control.key : control.label, "\n", " "))),
                   control.IsEnabled(),
                   {}};
-  for (const ConditionFact& fact : control.enabledWhen.Why(*control.node))
+  for (const ConditionFact& fact : control.enabledWhen.Why(*control.pageNode))
     why.reasons.push_back(explainer.InWords(fact, form.Node(), &form.Keys()));
   return why;
 }

@@ -7,7 +7,6 @@
 
 #include <fmt/format.h>
 
-#include "core/list.h"
 #include "core/path.h"
 #include "data/datafile_request.h"
 #include "pages/parts/plot_content.h"
@@ -16,37 +15,7 @@
 
 namespace tervane {
 
-/// A row of the table of files.
-class CoverageFileItem : public CTvnKvfBase {
- public:
-  explicit CoverageFileItem(CYbSEKvfBase* list) : CTvnKvfBase("File", "File_%d", list) {}
-
-  const CoverageRow* row = nullptr;
-};
-class CoverageFileList : public CYbSEKvfListBase<CoverageFileItem> {
- public:
-  CoverageFileList() : CYbSEKvfListBase("Files", "Files", nullptr) {}
-};
-
-/// A row of the table of totals: a forcing's station, or its mean over the domain.
-class CoverageTotalsItem : public CTvnKvfBase {
- public:
-  explicit CoverageTotalsItem(CYbSEKvfBase* list) : CTvnKvfBase("Total", "Total_%d", list) {}
-
-  const ForcingTotals* totals = nullptr;
-  std::size_t column = 0;
-};
-class CoverageTotalsList : public CYbSEKvfListBase<CoverageTotalsItem> {
- public:
-  CoverageTotalsList() : CYbSEKvfListBase("Totals", "Totals", nullptr) {}
-};
-
 namespace {
-
-template <class Item>
-Item& As(CYbSEKvfBase& item) {
-  return static_cast<Item&>(item);
-}
 
 std::string DateText(std::int64_t seconds) { return DateInWords(CYbDateTime::FromSecondsSinceEpoch(seconds)); }
 
@@ -82,13 +51,6 @@ std::string TextOf(const ForcingTotals& totals) {
 
 }  // namespace
 
-CCoverageDlg::CCoverageDlg(CYbSEKvfBase& node, PageContext context)
-    : PageOf(node, std::move(context)),
-      files_(std::make_unique<CoverageFileList>()),
-      totals_(std::make_unique<CoverageTotalsList>()) {}
-
-CCoverageDlg::~CCoverageDlg() = default;
-
 bool CCoverageDlg::Follow() {
   const auto computation = Node().Board();
   // Nobody would come back to what is computed beside the window.
@@ -101,61 +63,48 @@ bool CCoverageDlg::Follow() {
 void CCoverageDlg::ShowBoard(std::shared_ptr<const CoverageBoard> board) {
   board_ = std::move(board);
   // What needs the user most comes first.
-  std::vector<const CoverageRow*> rows;
-  for (const CoverageRow& row : board_->rows) rows.push_back(&row);
-  std::ranges::stable_sort(rows, std::greater(), &CoverageRow::state);
-  files_->SetItemCount(static_cast<int>(rows.size()), 1);
-  for (int number = 1; number <= files_->GetItemCount(); ++number)
-    files_->GetItem(number)->row = rows[static_cast<std::size_t>(number - 1)];
-
-  int count = 0;
-  for (const ForcingTotals& totals : board_->forcings) count += static_cast<int>(totals.columns.size());
-  totals_->SetItemCount(count, 1);
-  int number = 0;
-  for (const ForcingTotals& totals : board_->forcings) {
-    for (std::size_t column = 0; column < totals.columns.size(); ++column) {
-      CoverageTotalsItem& item = *totals_->GetItem(++number);
-      item.totals = &totals;
-      item.column = column;
-    }
-  }
+  files_.clear();
+  for (const CoverageRow& row : board_->rows) files_.push_back(&row);
+  std::ranges::stable_sort(files_, std::greater(), &CoverageRow::state);
+  totals_.clear();
+  for (const ForcingTotals& totals : board_->forcings)
+    for (std::size_t column = 0; column < totals.columns.size(); ++column) totals_.push_back({&totals, column});
+  // Each period has a column of its own.
+  using Row = CoverageTotalsRow;
   totalsTable_->ClearColumns();
-  TableColumn& forcing = totalsTable_->Add("Forcing", 190);
-  forcing.text = [](CYbSEKvfBase& item) {
-    const ForcingTotals& totals = *As<CoverageTotalsItem>(item).totals;
-    return fmt::format("{}, {}", totals.forcing.forcing.title, totals.form.isTotal ? "total" : "mean");
-  };
-  forcing.press = [this](CYbSEKvfBase& item) { GoTo(As<CoverageTotalsItem>(item).totals->forcing.path); };
-  totalsTable_->Add("Station", 110).text = [](CYbSEKvfBase& item) {
-    const CoverageTotalsItem& of = As<CoverageTotalsItem>(item);
-    return of.totals->ColumnText(of.column);
-  };
-  totalsTable_->Add("Unit", 50).text = [](CYbSEKvfBase& item) {
-    return As<CoverageTotalsItem>(item).totals->form.unit;
-  };
-  for (std::size_t period = 0; period < board_->periods.size(); ++period) {
-    TableColumn& value = totalsTable_->Add(board_->periods[period].name, 80);
-    value.text = [this, period](CYbSEKvfBase& item) {
-      const CoverageTotalsItem& of = As<CoverageTotalsItem>(item);
-      return of.totals->ValueText(of.column, period, board_->periods[period].span);
-    };
-    value.toolTip = "In brackets the share of the time that has values";
-  }
+  totalsTable_
+      ->Value("Forcing",
+              [](const Row& row) {
+                return fmt::format("{}, {}", row.totals->forcing.forcing.title,
+                                   row.totals->form.isTotal ? "total" : "mean");
+              })
+      .Width(190)
+      .Link([this](const Row& row) { GoTo(row.totals->forcing.path); });
+  totalsTable_->Value("Station", [](const Row& row) { return row.totals->ColumnText(row.column); }).Width(110);
+  totalsTable_->Value("Unit", [](const Row& row) { return row.totals->form.unit; }).Width(50);
+  for (std::size_t period = 0; period < board_->periods.size(); ++period)
+    totalsTable_
+        ->Value(board_->periods[period].name,
+                [this, period](const Row& row) {
+                  return row.totals->ValueText(row.column, period, board_->periods[period].span);
+                })
+        .Width(80)
+        .ToolTip("In brackets the share of the time that has values");
   const bool isThere =
       std::ranges::any_of(board_->rows, [&](const auto& row) { return row.file.path == chosen_; }) ||
       std::ranges::any_of(board_->forcings, [&](const auto& totals) { return totals.forcing.path == chosen_; });
   if (isThere) return;
-  if (!rows.empty()) ShowFile(1);
+  if (!files_.empty()) ShowFile(1);
 }
 
 void CCoverageDlg::ShowFile(int row) {
-  const CoverageRow& shown = *files_->GetItem(row)->row;
+  const CoverageRow& shown = *files_[static_cast<std::size_t>(row - 1)];
   chosen_ = shown.file.path;
   extent_ = shown.extent && !shown.isInDegrees ? OutlineOf(*shown.extent) : nullptr;
 }
 
 void CCoverageDlg::ShowTotals(int row) {
-  chosen_ = totals_->GetItem(row)->totals->forcing.path;
+  chosen_ = totals_[static_cast<std::size_t>(row - 1)].totals->forcing.path;
   extent_ = nullptr;
 }
 
@@ -263,35 +212,28 @@ void CCoverageDlg::Describe(PageForm& form) {
   });
   form.Shown("Model domain:", [this] { return DomainText(); });
 
-  auto files = std::make_shared<TableForm>(*files_);
+  auto files = std::make_shared<TableOf<const CoverageRow*>>(files_);
   files->ItemName("File");
-  TableColumn& data = files->Add("Data", 170);
-  data.text = [](CYbSEKvfBase& item) { return As<CoverageFileItem>(item).row->file.title; };
-  data.icon = [](CYbSEKvfBase& item) {
-    const CoverageState state = As<CoverageFileItem>(item).row->state;
-    return std::string(NameOf(state));
-  };
-  data.press = [this](CYbSEKvfBase& item) { GoTo(As<CoverageFileItem>(item).row->file.path); };
-  const auto add = [&](const char* head, int width, auto text) {
-    files->Add(head, width).text = [text](CYbSEKvfBase& item) { return text(*As<CoverageFileItem>(item).row); };
-  };
-  add("File", 110, [](const CoverageRow& row) { return std::string(FileNameOf(row.file.use.path)); });
-  add("Period", 160, [](const CoverageRow& row) { return row.PeriodText(); });
-  add("Simulation", 150, [](const CoverageRow& row) { return row.problem.empty() ? row.TimeText() : row.problem; });
-  add("Model domain", 170, [](const CoverageRow& row) { return row.AreaText(); });
-  files->ShowOnly([this](int row) {
-    ShowFile(row);
-    if (Context().syncSoon) Context().syncSoon();
-  });
+  files->Value("Data", [](const CoverageRow* row) { return row->file.title; })
+      .Width(170)
+      .IconOf([](const CoverageRow* row) { return std::string(NameOf(row->state)); })
+      .Link([this](const CoverageRow* row) { GoTo(row->file.path); });
+  files->Value("File", [](const CoverageRow* row) { return std::string(FileNameOf(row->file.use.path)); }).Width(110);
+  files->Value("Period", &CoverageRow::PeriodText).Width(160);
+  files
+      ->Value("Simulation",
+              [](const CoverageRow* row) { return row->problem.empty() ? row->TimeText() : row->problem; })
+      .Width(150);
+  files->Value("Model domain", &CoverageRow::AreaText).Width(170);
+  files->ShowOnly();
+  files->OnChoose([this](int row) { ShowFile(row); });
   form.Table(files);
   form.Shown("Remarks:", [this] { return RemarksText(); });
 
-  totalsTable_ = std::make_shared<TableForm>(*totals_);
+  totalsTable_ = std::make_shared<TableOf<CoverageTotalsRow>>(totals_);
   totalsTable_->ItemName("Total");
-  totalsTable_->ShowOnly([this](int row) {
-    ShowTotals(row);
-    if (Context().syncSoon) Context().syncSoon();
-  });
+  totalsTable_->ShowOnly();
+  totalsTable_->OnChoose([this](int row) { ShowTotals(row); });
   form.Table(totalsTable_);
   form.Map([this] { return Map(); });
   form.Chart([this] { return Chart(); });

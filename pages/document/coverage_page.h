@@ -4,21 +4,25 @@
 
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "document/coverage_board.h"
 #include "forms/page.h"
 #include "forms/plots.h"
+#include "forms/table_of.h"
 
 namespace tervane {
 
-class CoverageFileList;
-class CoverageTotalsList;
+/// A row of the table of totals: a forcing's station, or its mean over the domain.
+struct CoverageTotalsRow {
+  const ForcingTotals* totals = nullptr;
+  std::size_t column = 0;
+};
 
 /// How the data cover the simulation and the model domain, and what the forcings come to.
 class CCoverageDlg : public PageOf<CCoverageKvf> {
  public:
-  CCoverageDlg(CYbSEKvfBase& node, PageContext context);
-  ~CCoverageDlg() override;
+  using PageOf::PageOf;
 
   void OnRefresh() override { Follow(); }
 
@@ -40,9 +44,9 @@ class CCoverageDlg : public PageOf<CCoverageKvf> {
   SeriesContent Chart();
 
   std::shared_ptr<const CoverageBoard> board_;  ///< Null until one is computed.
-  std::unique_ptr<CoverageFileList> files_;
-  std::unique_ptr<CoverageTotalsList> totals_;
-  std::shared_ptr<TableForm> totalsTable_;
+  std::vector<const CoverageRow*> files_;
+  std::vector<CoverageTotalsRow> totals_;
+  std::shared_ptr<TableOf<CoverageTotalsRow>> totalsTable_;
   std::string chosen_;                          ///< The path of the file or forcing that map and chart show.
   std::shared_ptr<const CYbShapeData> extent_;  ///< Of the chosen file.
 };

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/simspec/period_pages.h"
 
-#include "forms/table_form.h"
+#include "forms/table_of.h"
 #include "platform/text.h"
 #include "simspec/extra_params.h"
 #include "simspec/periods.h"
@@ -133,61 +133,30 @@ void CSimPeriodOnFlowDlg::Describe(PageForm& form) {
 
 void DescribeExtraParams(PageForm& form, CExtraParamsKvf& n) {
   using Item = CExtraParamsItemKvf;
-  auto table = std::make_shared<TableForm>(n);
+  auto table = std::make_shared<TableOf<Item>>(n);
   table->ItemName("Parameter");
-  table->Column<Item>("Name", 220, CellKind::Text, [](Item& item) -> std::string& { return item.Name; });
-  table->Choice<Item>("Type", 100, [](Item& item) -> int& { return item.Type; },
-                      {"Float", "Integer", "Bool", "Text", "Filename"});
+  table->Value("Name", &Item::Name).Width(220);
+  table->Choice("Type", &Item::Type, {"Float", "Integer", "Bool", "Text", "Filename"});
   // The cell follows the row's type; each type has a value of its own.
-  TableColumn& value = table->Add("Value", 260);
-  value.kind = [](CYbSEKvfBase& node) {
-    switch (static_cast<Item&>(node).Type) {
-      case Item::kFloat:
-        return CellKind::Number;
-      case Item::kInteger:
-        return CellKind::Integer;
-      case Item::kBool:
-        return CellKind::Check;
-      case Item::kFilename:
-        return CellKind::File;
-      default:
-        return CellKind::Text;
-    }
-  };
-  value.text = [](CYbSEKvfBase& node) {
-    const auto& item = static_cast<Item&>(node);
-    switch (item.Type) {
-      case Item::kFloat:
-        return CellText(item.FloatValue);
-      case Item::kInteger:
-        return CellText(item.IntegerValue);
-      case Item::kBool:
-        return CellText(item.BoolValue);
-      case Item::kText:
-        return item.TextValue;
-      case Item::kFilename:
-        return item.FilenameValue.Text();
-      default:
-        return std::string();
-    }
-  };
-  value.enter = [](CYbSEKvfBase& node, const std::string& typed) -> std::string {
-    auto& item = static_cast<Item&>(node);
-    switch (item.Type) {
-      case Item::kFloat:
-        return TakeCell(item.FloatValue, typed, item);
-      case Item::kInteger:
-        return TakeCell(item.IntegerValue, typed, item);
-      case Item::kBool:
-        return TakeCell(item.BoolValue, typed, item);
-      case Item::kText:
-        return TakeCell(item.TextValue, typed, item);
-      case Item::kFilename:
-        return TakeCell(item.FilenameValue, typed, item);
-      default:
-        return "a type of the list must be chosen first";
-    }
-  };
+  table
+      ->Value("Value",
+              [](Item& item) -> CellPlace {
+                switch (item.Type) {
+                  case Item::kFloat:
+                    return &item.FloatValue;
+                  case Item::kInteger:
+                    return &item.IntegerValue;
+                  case Item::kBool:
+                    return CheckOf{&item.BoolValue};
+                  case Item::kText:
+                    return &item.TextValue;
+                  case Item::kFilename:
+                    return &item.FilenameValue;
+                  default:
+                    return NoCell{"a type of the list must be chosen first"};
+                }
+              })
+      .Width(260);
   form.Table(std::move(table));
 }
 

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/spatial/zone_pages.h"
 
-#include "forms/table_form.h"
+#include "forms/table_of.h"
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/plot_content.h"
 #include "platform/item_types.h"
@@ -126,13 +126,11 @@ void DescribeSubcatchment(PageForm& form, CSubcatchmentPropKvf& n) {
 
 void DescribeRiverLinks(PageForm& form, CSubcatchmentRiverlinksListKvf& n) {
   using Item = CSubcatchmentRiverlinkItemKvf;
-  auto table = std::make_shared<TableForm>(n);
+  auto table = std::make_shared<TableOf<Item>>(n);
   table->ItemName("River Link");
-  table->Column<Item>("Branch name", 220, CellKind::Text, [](Item& item) -> std::string& { return item.Branchname; });
-  table->Column<Item>("Upstream", 120, CellKind::Number, [](Item& item) -> float& { return item.Upstream; }).itemType =
-      quantity::kChainage;
-  table->Column<Item>("Downstream", 120, CellKind::Number, [](Item& item) -> float& { return item.Downstream; })
-      .itemType = quantity::kChainage;
+  table->Value("Branch name", &Item::Branchname).Width(220);
+  table->Value("Upstream", &Item::Upstream).Width(120).Quantity(quantity::kChainage).Format("%.6g");
+  table->Value("Downstream", &Item::Downstream).Width(120).Quantity(quantity::kChainage).Format("%.6g");
   form.Table(std::move(table));
 }
 

@@ -2,6 +2,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/page/control_widget.h"
 
+#include <QAction>
+#include <QApplication>
+#include <QClipboard>
 #include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QMenu>
@@ -119,6 +122,15 @@ void ControlWidget::SyncUnit() {
   if (auto* button = qobject_cast<QToolButton*>(unit_)) button->setText(unit);
 }
 
+void ControlWidget::SyncSubject() {
+  if (!control_.subject || control_.subject() == subject_) return;
+  subject_ = control_.subject();
+  Forget();
+  refusal_.clear();
+  SyncMessage();
+  ShowRefused(false);
+}
+
 void ControlWidget::Sync() {
   if (!field_) return;
   const bool shown = control_.IsShown();
@@ -128,6 +140,7 @@ void ControlWidget::Sync() {
     label_->setVisible(shown);
     label_->setEnabled(enabled);
   }
+  SyncSubject();
   SyncEnabled(enabled);
   SyncValue();
   SyncUnit();

@@ -61,6 +61,8 @@ class ControlWidget : public QObject {
   void SetRemark(const QString& remark);
   /// The marks in which a refused value stands out.
   virtual void ShowRefused(bool /*refused*/) {}
+  /// What was typed and not entered belongs to what was shown before.
+  virtual void Forget() {}
 
   CYbSEDlgBase& Page() const { return page_; }
   /// Puts the label in front of the field.
@@ -70,6 +72,7 @@ class ControlWidget : public QObject {
 
  private:
   QWidget* MakeUnit();
+  void SyncSubject();
   void SyncUnit();
   void SyncFindings();
   void SyncMessage();
@@ -80,6 +83,7 @@ class ControlWidget : public QObject {
   QPointer<QWidget> unit_;  ///< A label, or a button where the user may choose.
   QPointer<QLabel> mark_, message_;
   QString refusal_, remark_;
+  std::uintptr_t subject_ = 0;  ///< What the value that is shown belongs to.
 };
 
 }  // namespace tervane

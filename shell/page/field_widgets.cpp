@@ -1,17 +1,18 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <QAction>
-#include <QCalendarWidget>
-#include <QDateTime>
+#include <QDropEvent>
 #include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QLineEdit>
 #include <QMenu>
+#include <QMimeData>
 #include <QPlainTextEdit>
 #include <QToolButton>
-#include <QWidgetAction>
+#include <QUrl>
 
 #include "shell/page/control_widgets.h"
+#include "shell/widgets/date_entry.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -57,6 +58,7 @@ class LineWidget : public ControlWidget {
   }
 
  protected:
+  void Forget() override { edited_ = false; }
   void SyncValue() override {
     if (edited_ || IsRefused()) return;
     if (const QString text = ToQt(Described().Text()); text != edit_->text()) {
@@ -112,22 +114,13 @@ class LineWidget : public ControlWidget {
         return kTextWidth;
     }
   }
-  static QString DateFormat() { return "yyyy/MM/dd  HH:mm"; }
-  QDateTime ShownDate() const { return QDateTime::fromString(ToQt(Described().Text()), DateFormat()); }
-
   /// Counts the part of the date in which the cursor stands.
   bool StepDate(int by) {
     Commit();
-    const QDateTime date = ShownDate();
-    if (!date.isValid() || IsRefused()) return false;
     const int cursor = edit_->cursorPosition();
-    const QDateTime stepped = cursor <= 4    ? date.addYears(by)
-                              : cursor <= 7  ? date.addMonths(by)
-                              : cursor <= 10 ? date.addDays(by)
-                              : cursor <= 14 ? date.addSecs(3600 * by)
-                                             : date.addSecs(60 * by);
-    if (stepped.date().year() < 1 || stepped.date().year() > 9999) return true;
-    Enter(stepped.toString(DateFormat()));
+    const QString stepped = SteppedDate(ToQt(Described().Text()), cursor, by);
+    if (stepped.isEmpty() || IsRefused()) return false;
+    Enter(stepped);
     edit_->setCursorPosition(cursor);
     return true;
   }
@@ -136,27 +129,12 @@ class LineWidget : public ControlWidget {
     button->setIcon(Theme::Get().Icon("calendar"));
     button->setToolTip(tr("Choose a day"));
     button->setAccessibleName(tr("Calendar for %1").arg(Translated(Described().label)));
-    auto* menu = new QMenu(button);
-    auto* calendar = new QCalendarWidget;
-    calendar->setGridVisible(true);
-    auto* action = new QWidgetAction(menu);
-    action->setDefaultWidget(calendar);
-    menu->addAction(action);
-    connect(button, &QToolButton::clicked, menu,
-            [button, menu] { menu->popup(button->mapToGlobal(QPoint(0, button->height()))); });
-    connect(menu, &QMenu::aboutToShow, this, [this, calendar] {
+    QMenu* menu = NewCalendarMenu(
+        button, [this] { return ToQt(Described().Text()); }, [this](const QString& date) { Enter(date); });
+    connect(button, &QToolButton::clicked, menu, [this, button, menu] {
       Commit();
-      if (const QDateTime date = ShownDate(); date.isValid()) calendar->setSelectedDate(date.date());
-      calendar->setFocus();
+      menu->popup(button->mapToGlobal(QPoint(0, button->height())));
     });
-    const auto choose = [this, menu](const QDate& day) {
-      const QDateTime date = ShownDate();
-      const QTime time = date.isValid() ? date.time() : QTime(0, 0);
-      menu->close();
-      Enter(QDateTime(day, time).toString(DateFormat()));
-    };
-    connect(calendar, &QCalendarWidget::clicked, this, choose);
-    connect(calendar, &QCalendarWidget::activated, this, choose);
     return button;
   }
   void Browse() {
@@ -167,11 +145,7 @@ class LineWidget : public ControlWidget {
       if (self) SyncValue();
       return;
     }
-    Host::FileQuestion question = Described().fileQuestion;
-    const CYbSEKvfGlobalBase* root = Page().Node().GetRoot();
-    question.current = FileName(Described().Text(), root ? root->SetupFolder() : std::string()).Absolute();
-    if (question.current.empty() && root) question.current = root->SetupFolder();
-    if (const auto chosen = Page().Outside().AskFileToOpen(question)) Enter(ToQt(*chosen));
+    if (const auto chosen = Page().AskFile(Described().fileQuestion, Described().Text())) Enter(ToQt(*chosen));
   }
 
   QLineEdit* edit_;

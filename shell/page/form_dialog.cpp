@@ -3,6 +3,7 @@
 #include "shell/page/form_dialog.h"
 
 #include <QDialogButtonBox>
+#include <QTimer>
 #include <QVBoxLayout>
 
 #include "shell/page/page_view.h"
@@ -21,7 +22,7 @@ FormDialog::FormDialog(const QString& title, CYbSEDlgBase& form, std::function<s
   connect(buttons, &QDialogButtonBox::accepted, this, &FormDialog::TryAccept);
   connect(buttons, &QDialogButtonBox::rejected, this, &QDialog::reject);
   // A dialog has no document that tells of changes: its form follows its own.
-  form.FollowItself([this] { view_->Sync(); });
+  form.FollowItself([this] { view_->Sync(); }, [this] { QTimer::singleShot(0, view_, &PageView::Sync); });
   resize(view_->WantedSize() + QSize(0, Theme::Get().Scaled(80)));
   view_->FocusOn({});
 }

@@ -2,48 +2,16 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <QAbstractTableModel>
 #include <QTableView>
 #include <QWidget>
+#include <optional>
 
-#include "forms/page.h"
-#include "forms/table_form.h"
+#include "shell/page/table_model.h"
 
 class QLabel;
 class QToolButton;
 
 namespace tervane {
-
-/// The rows and cells of a table form for the toolkit's views. Rows and columns count from 0 here.
-class TableModel : public QAbstractTableModel {
-  Q_OBJECT
-
- public:
-  TableModel(CYbSEDlgBase& page, Control& control)
-      : page_(page), control_(control), rows_(Table().RowCount()), heads_(Heads()) {}
-
-  TableForm& Table() const { return *control_.table; }
-  /// Follows the list, also in its number of rows.
-  void Sync();
-  /// Why the latest value that was set was refused; empty when it was taken.
-  const QString& Refusal() const { return refusal_; }
-
-  int rowCount(const QModelIndex& parent = {}) const override { return parent.isValid() ? 0 : rows_; }
-  int columnCount(const QModelIndex& parent = {}) const override;
-  QVariant data(const QModelIndex& index, int role) const override;
-  bool setData(const QModelIndex& index, const QVariant& value, int role) override;
-  QVariant headerData(int section, Qt::Orientation orientation, int role) const override;
-  Qt::ItemFlags flags(const QModelIndex& index) const override;
-
- private:
-  QStringList Heads() const;
-
-  CYbSEDlgBase& page_;
-  Control& control_;
-  int rows_;
-  QStringList heads_;  ///< Of the columns that views know.
-  QString refusal_;
-};
 
 /// A table as a spreadsheet: cells are selected, copied, pasted and filled down, whole rows inserted, deleted and
 /// moved.
@@ -78,7 +46,20 @@ class TableView : public QWidget {
   std::optional<CellRange> Selected() const;
   /// First and last of the rows that are selected as a whole; zeros when there are none.
   std::pair<int, int> SelectedRows() const;
+  void MakeButtons();
+  void MakeView();
+  void ConnectView();
+  void MakeActions();
   void ChangeRowOfCurrentCell(RowAction action);
+  /// Makes the cell the current one of the row that is current in the form.
+  void FollowCurrentRow();
+  /// The first column in which something can be typed, from 0.
+  int FirstEditableColumn(int row) const;
+  /// Goes to the next cell as the key says; false at an end of the table.
+  bool GoOn(int key, Qt::KeyboardModifiers modifiers);
+  bool TakeKey(const QKeyEvent& keys);
+  /// Opens the list or the calendar of the current cell.
+  void OpenList();
   void Tell(const CellsResult& result, const QString& done);
   void SyncButtons();
   void FitColumns();
@@ -91,6 +72,8 @@ class TableView : public QWidget {
   QLabel* message_;
   QToolButton *insert_, *delete_, *up_, *down_;
   bool hasFittedColumns_ = false;
+  bool isSyncing_ = false;
+  bool isSelectedByHead_ = false;  ///< In a table of one column each cell would be a whole row.
 };
 
 }  // namespace tervane

@@ -4,6 +4,7 @@
 
 #include <gmock/gmock.h>
 
+#include "forms/table_of.h"
 #include "platform/text.h"
 #include "simspec/extra_params.h"
 #include "tests/support/page_driver.h"
@@ -32,6 +33,8 @@ class ExtraParamsTable : public testing::Test {
     }
   }
 
+  CExtraParamsKvf& List() { return static_cast<CExtraParamsKvf&>(page.Page().Node()); }
+
   CFlowModelDoc document;
   PageDriver page{document, "ExtraParams"};
 };
@@ -55,7 +58,7 @@ TEST_F(ExtraParamsTable, RowsAreInsertedDeletedAndMovedAsAWhole) {
       {&TableForm::MoveRowsDown, 3, 4, 0, "abcd"},
   };
   for (const Case& c : cases) {
-    Table().List().SetItemCount(0, 1);
+    List().SetItemCount(0, 1);
     Fill("abcd");
     EXPECT_EQ((Table().*c.operation)(c.first, c.last), c.hint);
     std::string names;
@@ -78,7 +81,7 @@ TEST_F(ExtraParamsTable, AValueCellFollowsTheTypeOfItsRow) {
                         {"4", "x/y.bin", "x/y.bin", "\xFF", CellKind::File}};
   for (const Case& c : cases) {
     ASSERT_EQ(Table().Enter(1, 2, c.type), "");
-    EXPECT_EQ(Table().Columns()[2].kind(*Table().List().GetItemNode(1)), c.kind);
+    EXPECT_EQ(Table().Kind(1, 3), c.kind);
     EXPECT_EQ(Table().Enter(1, 3, c.typed), "");
     EXPECT_EQ(Table().Cell(1, 3), c.shown);
     EXPECT_THAT(Table().Enter(1, 3, c.refused), HasSubstr("expected"));
@@ -118,7 +121,7 @@ TEST_F(ExtraParamsTable, WhatIsCopiedIsPastedAgain) {
   EXPECT_EQ(Table().Cell(2, 3), "two\nlines \"quoted\"");
   EXPECT_EQ(Table().Cell(5, 3), "1");
   const std::string copied = Table().CopyText({1, 1, 99, 99});
-  Table().List().SetItemCount(0, 1);
+  List().SetItemCount(0, 1);
   EXPECT_EQ(Table().Paste(OneCell(9, 1), Replaced(copied, "\n", "\r\n")).refused, 0);
   EXPECT_EQ(Table().Cell(2, 3), "two\r\nlines \"quoted\"");
   EXPECT_EQ(Replaced(Table().CopyText({1, 1, 99, 99}), "\r\n", "\n"), copied);
@@ -153,7 +156,7 @@ TEST_F(ExtraParamsTable, APasteTakesWhatItCanAndTellsTheRest) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.text);
-    Table().List().SetItemCount(0, 1);
+    List().SetItemCount(0, 1);
     Fill("ab");
     Table().Enter(2, 2, "1");
     const CellsResult result = Table().Paste(c.selected, c.text);
@@ -206,16 +209,15 @@ TEST_F(ExtraParamsTable, ANumberColumnWithAUnitIsShownAndTypedInIt) {
   constexpr int kThickness = 100367, kFoot = 1003;
   using Item = CExtraParamsItemKvf;
   Fill("ab");
-  TableForm table(Table().List());
-  const auto value = [](Item& item) -> double& { return item.FloatValue; };
-  table.Column<Item>("Depth", 80, CellKind::Number, value).itemType = kThickness;
-  table.Column<Item>("Depth", 80, CellKind::Number, value).unit = "[mm]";
-  table.Column<Item>("Depth", 80, CellKind::Number, value).readOnly = [](CYbSEKvfBase&) { return true; };
+  TableOf<Item> table(List());
+  table.Value("Depth", &Item::FloatValue).Quantity(kThickness);
+  table.Value("Depth", &Item::FloatValue).Unit("[mm]");
+  table.Value("Depth", &Item::FloatValue).GreyWhen([](Item&) { return true; });
   DisplayUnits units;
   ASSERT_TRUE(units.Choose(kThickness, kFoot));
   table.SetDisplayUnits(&units);
   EXPECT_EQ(table.Head(1) + ", " + table.Head(2) + ", " + table.Head(3), "Depth [ft], Depth [mm], Depth");
-  double& stored = static_cast<Item*>(table.List().GetItemNode(1))->FloatValue;
+  double& stored = List().GetItem(1)->FloatValue;
   EXPECT_EQ(table.Enter(1, 1, "1"), "");
   EXPECT_EQ(stored, 0.3048);
   EXPECT_EQ(table.Enter(1, 2, "2 m"), "");
@@ -223,7 +225,7 @@ TEST_F(ExtraParamsTable, ANumberColumnWithAUnitIsShownAndTypedInIt) {
   EXPECT_THAT(table.Enter(1, 3, "3"), HasSubstr("cannot be changed"));
   stored = 1.0 / 3;
   table.FillDown({1, 1, 2, 1});
-  EXPECT_EQ(static_cast<Item*>(table.List().GetItemNode(2))->FloatValue, 1.0 / 3);
+  EXPECT_EQ(List().GetItem(2)->FloatValue, 1.0 / 3);
   EXPECT_GT(table.UnitChoices(1).size(), 1u);
   EXPECT_THAT(table.UnitChoices(2), IsEmpty());
 }

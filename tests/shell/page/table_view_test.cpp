@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/page/table_view.h"
 
+#include <QCalendarWidget>
+#include <QComboBox>
 #include <QHeaderView>
 #include <QTableView>
 #include <QToolButton>
@@ -9,6 +11,7 @@
 #include <gmock/gmock.h>
 
 #include "tests/shell/opened_setup.h"
+#include "tests/support/table_page.h"
 
 namespace tervane {
 namespace {
@@ -135,6 +138,230 @@ TEST(TableView, AValueThatTheCellRefusesStaysInItsEditor) {
   editor->setText("12");
   QTest::keyClick(editor, Qt::Key_Return);
   EXPECT_EQ(table.Value("ExtraParams/ExtraParam_1:Value"), "12");
+}
+
+/// The columns of the test page by their numbers.
+enum Column { kName = 1, kStart, kDays, kEnd, kProcess, kSpecies, kX, kPick, kHasFile, kFile, kBrowse, kEdit };
+
+/// The page with every kind of cell, worked as a user works it.
+class ShownTable {
+ public:
+  explicit ShownTable(std::vector<test::TableRow> rows = test::TablePage::ThreeRows(), QSize size = {1400, 640}) {
+    page_.rows = std::move(rows);
+    page_.Initialize();
+    shown_ = std::make_unique<PageView>(page_);
+    page_.FollowItself([this] { shown_->Sync(); }, [this] { shown_->Sync(); });
+    shown_->resize(size);
+    shown_->show();
+    shown_->activateWindow();
+    QApplication::processEvents();
+    table_ = shown_->findChild<TableView*>();
+    cells_ = table_->findChild<QTableView*>();
+    cells_->setFocus();
+  }
+  test::TablePage& Page() { return page_; }
+  PageView& Shown() { return *shown_; }
+  QTableView& Cells() { return *cells_; }
+  test::TableRow& Row(int row) { return page_.rows[static_cast<std::size_t>(row - 1)]; }
+  void GoTo(int row, int column) { table_->SelectCell(row, column); }
+  std::pair<int, int> Current() const {
+    return {cells_->currentIndex().row() + 1, cells_->currentIndex().column() + 1};
+  }
+  /// Presses a key where the keyboard is: in an editor, or in the table.
+  void Press(Qt::Key key, Qt::KeyboardModifiers modifiers = Qt::NoModifier) {
+    QTest::keyClick(shown_->focusWidget(), key, modifiers);
+    QApplication::processEvents();
+  }
+  void Type(const QString& text) {
+    for (const QChar& letter : text) QTest::keyClicks(shown_->focusWidget(), QString(letter));
+  }
+  void PressButton(const QString& text) {
+    for (QToolButton* button : table_->findChildren<QToolButton*>())
+      if (button->text() == text) button->click();
+  }
+  void Click(int row, int column) {
+    const QModelIndex index = cells_->model()->index(row - 1, column - 1);
+    cells_->scrollTo(index);
+    QTest::mouseClick(cells_->viewport(), Qt::LeftButton, {}, cells_->visualRect(index).center());
+    QApplication::processEvents();
+  }
+  std::string Names() {
+    std::string names;
+    for (const test::TableRow& row : page_.rows) names += row.name + " ";
+    return names;
+  }
+
+ private:
+  CFlowModelDoc document_;
+  NobodyToAsk host_;
+  test::TablePage page_{{document_, host_, {}}};
+  std::unique_ptr<PageView> shown_;
+  TableView* table_;
+  QTableView* cells_;
+};
+
+TEST(TableView, KeysGoOnAsInASpreadsheet) {
+  using Cell = std::pair<int, int>;
+  const struct {
+    Cell from;
+    Qt::Key key;
+    Qt::KeyboardModifiers modifiers;
+    Cell to;
+  } cases[] = {
+      {{1, 1}, Qt::Key_Tab, Qt::NoModifier, {1, 2}},         {{1, kEdit}, Qt::Key_Tab, Qt::NoModifier, {2, 1}},
+      {{2, 1}, Qt::Key_Backtab, Qt::ShiftModifier, {1, 12}}, {{1, 1}, Qt::Key_Return, Qt::NoModifier, {2, 1}},
+      {{3, 2}, Qt::Key_Enter, Qt::ShiftModifier, {2, 2}},    {{3, 2}, Qt::Key_Return, Qt::NoModifier, {3, 2}},
+  };
+  for (const auto& c : cases) {
+    ShownTable table;
+    table.GoTo(c.from.first, c.from.second);
+    table.Press(c.key, c.modifiers);
+    EXPECT_EQ(table.Current(), c.to);
+  }
+  // The same out of an editor, which hands its value over.
+  ShownTable table;
+  table.GoTo(1, kName);
+  table.Press(Qt::Key_F2);
+  table.Press(Qt::Key_End);
+  table.Type("!");
+  table.Press(Qt::Key_Return);
+  table.Type("July");
+  table.Press(Qt::Key_Tab);
+  EXPECT_EQ(table.Names(), "Spring! July Autumn ");
+  EXPECT_EQ(table.Current(), Cell(2, kStart));
+  table.Type("2001-02-03");
+  table.Press(Qt::Key_Tab);
+  table.Type("many");
+  table.Press(Qt::Key_Tab);
+  EXPECT_EQ(table.Row(2).start, CYbDateTime(2001, 2, 3));
+  EXPECT_EQ(table.Current(), Cell(2, kDays)) << "what is refused stays";
+  table.Press(Qt::Key_Escape);
+  // At its end the table gives the keyboard away.
+  table.GoTo(3, kEdit);
+  table.Press(Qt::Key_Tab);
+  EXPECT_FALSE(table.Cells().hasFocus());
+}
+
+TEST(TableView, ANewRowTakesWhatIsTyped) {
+  ShownTable table;
+  table.PressButton("Insert");
+  table.Type("Winter");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Names(), "Spring Summer Autumn Winter ");
+  table.GoTo(2, kDays);
+  table.Press(Qt::Key_Insert, Qt::ControlModifier);
+  table.Type("May");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Names(), "Spring May Summer Autumn Winter ");
+  table.Cells().selectRow(0);
+  table.PressButton("Insert");
+  table.PressButton("Insert");
+  table.Type("March");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Names(), "March  Spring May Summer Autumn Winter ") << "rows that are selected stay so";
+}
+
+TEST(TableView, ButtonsActOnTheRowOfTheCurrentCellWhereNoRowIsSelected) {
+  ShownTable table;
+  table.GoTo(2, kDays);
+  table.PressButton("Up");
+  EXPECT_EQ(table.Names(), "Summer Spring Autumn ");
+  EXPECT_EQ(table.Current(), std::pair(1, static_cast<int>(kDays)));
+  table.PressButton("Down");
+  table.PressButton("Down");
+  EXPECT_EQ(table.Names(), "Spring Autumn Summer ");
+  table.PressButton("Delete");
+  EXPECT_EQ(table.Names(), "Spring Autumn ");
+  EXPECT_EQ(table.Current().first, 2);
+}
+
+TEST(TableView, ButtonsInCellsArePressedByMouseAndKeyboard) {
+  ShownTable table;
+  table.Click(2, kEdit);
+  table.Click(1, kEdit);  // it is disabled
+  table.Click(3, kPick);
+  table.GoTo(1, kBrowse);
+  table.Press(Qt::Key_Space);
+  EXPECT_THAT(table.Page().pressed, testing::ElementsAre("edit Summer", "pick Autumn", "browse Spring"));
+}
+
+TEST(TableView, ADateIsChosenInTheCalendarOfItsCell) {
+  ShownTable table;
+  table.GoTo(3, kStart);
+  table.Press(Qt::Key_Down, Qt::AltModifier);
+  auto* calendar = table.Cells().findChild<QCalendarWidget*>();
+  ASSERT_TRUE(calendar);
+  EXPECT_EQ(calendar->selectedDate(), QDate(2000, 9, 1));
+  emit calendar->activated(QDate(2002, 3, 4));
+  EXPECT_EQ(table.Row(3).start, CYbDateTime(2002, 3, 4, 12, 30)) << "the time of day stays";
+}
+
+TEST(TableView, AChoiceOffersWhatItsRowHas) {
+  ShownTable table;
+  const auto open = [&](int row, int column) {
+    table.GoTo(row, column);
+    table.Press(Qt::Key_F2);
+    return table.Cells().findChild<QComboBox*>();
+  };
+  auto* list = open(2, kSpecies);
+  ASSERT_TRUE(list);
+  EXPECT_EQ(list->itemText(0) + list->itemText(1), "SandClay");
+  EXPECT_EQ(list->currentIndex(), -1) << "none is chosen yet";
+  table.Type("c");
+  EXPECT_EQ(table.Row(2).species, "Clay");
+  QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+  list = open(2, kProcess);
+  ASSERT_TRUE(list);
+  EXPECT_EQ(list->currentText(), "Bulk density");
+  table.Type("p");
+  EXPECT_EQ(table.Row(2).process, 1110);
+}
+
+TEST(TableView, ColumnsComeAndGoAndHeadsGoOverThem) {
+  ShownTable table;
+  QHeaderView& head = *table.Cells().horizontalHeader();
+  EXPECT_GE(head.height(), 2 * head.fontMetrics().height()) << "a head of two lines is seen as a whole";
+  EXPECT_EQ(head.sectionResizeMode(kEdit - 1), QHeaderView::Fixed);
+  table.GoTo(2, kName);
+  table.Page().withX = false;
+  table.Shown().Sync();
+  EXPECT_EQ(table.Cells().model()->columnCount(), 11);
+  EXPECT_EQ(table.Current().first, 2) << "the row stays";
+  EXPECT_EQ(head.sectionResizeMode(kEdit - 2), QHeaderView::Fixed);
+  // One head lies over three columns: no line parts it.
+  const QImage picture = head.grab().toImage();
+  const int border = head.sectionViewportPosition(kBrowse - 2), y = picture.height() / 2;
+  for (int x = border - 2; x <= border + 2; ++x) EXPECT_EQ(picture.pixel(x, y), picture.pixel(border - 3, y)) << x;
+}
+
+TEST(TableView, FieldsBelowFollowTheCurrentRow) {
+  ShownTable table;
+  const auto field = [&](const QString& name) {
+    for (QLineEdit* line : table.Shown().findChildren<QLineEdit*>())
+      if (line->accessibleName() == name) return line;
+    return static_cast<QLineEdit*>(nullptr);
+  };
+  QLineEdit* length = field("Length of the season:");
+  ASSERT_TRUE(length);
+  EXPECT_EQ(length->text(), "30");
+  table.Click(2, kName);
+  EXPECT_EQ(length->text(), "121.66666666666667");
+  length->setFocus();
+  length->selectAll();
+  table.Type("long");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(length->text(), "long") << "what is refused stays";
+  table.Click(3, kName);
+  EXPECT_EQ(length->text(), "30") << "in its row alone";
+  table.PressButton("Up");
+  length->setFocus();
+  length->selectAll();
+  table.Type("7");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Names() + std::to_string(table.Row(2).days), "Spring Autumn Summer 7.000000");
+  for (int i = 0; i < 3; ++i) table.PressButton("Delete");
+  EXPECT_FALSE(length->isEnabled());
+  EXPECT_EQ(length->text(), "");
 }
 
 TEST(TableView, WhatIsOnlyShownHasLinksAndNothingToChange) {

@@ -1,0 +1,98 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Where the rows of a table come from. Rows count from 1.
+#pragma once
+
+#include <concepts>
+#include <utility>
+#include <vector>
+
+#include "core/list.h"
+
+namespace tervane {
+
+/// The rows of a table without their class.
+class TableRows {
+ public:
+  virtual ~TableRows() = default;
+
+  virtual int Count() const = 0;
+  /// What tells a row from all others, wherever it stands; null where nothing does.
+  virtual const void* Identity(int /*row*/) const { return nullptr; }
+  /// The node whose folder names of files are relative to; null where there is none.
+  virtual const CYbSEKvfBase* Node(int /*row*/) const { return nullptr; }
+  /// Whether rows can come, go and move.
+  virtual bool CanChange() const { return false; }
+  /// Appends a row.
+  virtual void Add() {}
+  /// Inserts one above a row that is there.
+  virtual void Insert(int /*row*/) {}
+  virtual void Delete(int /*row*/) {}
+  virtual bool MoveUp(int /*row*/) { return false; }
+  virtual bool MoveDown(int /*row*/) { return false; }
+};
+
+/// Rows of one class.
+template <class Row>
+class RowsOf : public TableRows {
+ public:
+  /// A row that is there.
+  virtual Row& At(int row) const = 0;
+};
+
+/// The items of a list node.
+template <class Item>
+class ListRows : public RowsOf<Item> {
+ public:
+  explicit ListRows(CYbSEKvfAbstractListBase<Item>& list) : list_(list) {}
+
+  int Count() const override { return list_.GetItemCount(); }
+  Item& At(int row) const override { return *list_.GetItem(row); }
+  const void* Identity(int row) const override { return list_.GetItemNode(row); }
+  const CYbSEKvfBase* Node(int row) const override { return list_.GetItemNode(row); }
+  bool CanChange() const override { return true; }
+  void Add() override { list_.AddItemNode(); }
+  void Insert(int row) override { list_.InsertItem(row, 1); }
+  void Delete(int row) override { list_.DeleteItem(row, 1); }
+  bool MoveUp(int row) override { return list_.MoveItemUp(row, 1); }
+  bool MoveDown(int row) override { return list_.MoveItemDown(row, 1); }
+
+ private:
+  CYbSEKvfAbstractListBase<Item>& list_;
+};
+
+/// Plain values, which outlive the table.
+template <class Row>
+class ValueRows : public RowsOf<Row> {
+ public:
+  explicit ValueRows(std::vector<Row>& values) : values_(values) {}
+
+  int Count() const override { return static_cast<int>(values_.size()); }
+  Row& At(int row) const override { return values_[static_cast<std::size_t>(row - 1)]; }
+  bool CanChange() const override { return std::default_initializable<Row>; }
+  void Add() override { InsertAt(Count()); }
+  void Insert(int row) override {
+    if (IsThere(row)) InsertAt(row - 1);
+  }
+  void Delete(int row) override {
+    if (IsThere(row)) values_.erase(values_.begin() + (row - 1));
+  }
+  bool MoveUp(int row) override { return Swap(row, row - 1); }
+  bool MoveDown(int row) override { return Swap(row, row + 1); }
+
+ private:
+  bool IsThere(int row) const { return row >= 1 && row <= Count(); }
+  void InsertAt(int place) {
+    if constexpr (std::default_initializable<Row>) values_.insert(values_.begin() + place, Row());
+  }
+  bool Swap(int row, int other) {
+    if (!IsThere(row) || !IsThere(other)) return false;
+    std::swap(At(row), At(other));
+    return true;
+  }
+
+  std::vector<Row>& values_;
+};
+
+}  // namespace tervane
