@@ -5,6 +5,7 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include "data/datafile_request.h"
 #include "platform/dates.h"
 #include "platform/text.h"
 #include "spatial/coverage.h"
