@@ -94,8 +94,8 @@ TEST(MapView, AValueOnABorderHasTheColourOfTheClassAboveInTheUsersUnit) {
   feet.Choose(kElevation, 1003);
   const auto grid = Grid({4, 1, 100, 0, 0, 0, {}}, {0, 0.3048F * 100, 0.3048F * 1000, 0.3048F * 99.9F});
   const MapPalette palette = MapPalette::Of({grid}, &feet);
-  EXPECT_EQ(palette.Legend().back().text.toStdString(), "0 – 100");
-  EXPECT_EQ(palette.Legend().front().text.toStdString(), "900 – 1000");
+  EXPECT_EQ(palette.Legend().rows.back().text.toStdString(), "0 – 100");
+  EXPECT_EQ(palette.Legend().rows.front().text.toStdString(), "900 – 1000");
   EXPECT_EQ(palette.ColorNumber(0.3048F * 99.9F), 1);
   EXPECT_EQ(palette.ColorNumber(0.3048F * 100), 2);
   EXPECT_EQ(palette.ColorNumber(0.3048F * 1000), 10);
@@ -104,7 +104,7 @@ TEST(MapView, AValueOnABorderHasTheColourOfTheClassAboveInTheUsersUnit) {
   std::vector<float> values(10'000);
   for (std::size_t i = 0; i < values.size(); ++i) values[i] = static_cast<float>(i % 100);
   values[17] = 1e6F;
-  EXPECT_THAT(MapPalette::Of({Grid({100, 100, 1, 0, 0, 0, {}}, values)}, nullptr).Legend().front().text.toStdString(),
+  EXPECT_THAT(MapPalette::Of({Grid({100, 100, 1, 0, 0, 0, {}}, values)}, nullptr).Legend().rows.front().text.toStdString(),
               HasSubstr("above 90"));
 }
 
@@ -112,10 +112,10 @@ TEST(MapView, TheLegendOfCodesTellsTwentyAndHowManyMore) {
   std::vector<float> codes;
   for (int i = 0; i < 300; ++i) codes.push_back(static_cast<float>(i + 7));
   const MapPalette palette = MapPalette::Of({Grid({300, 1, 1, 0, 0, 0, {}}, codes), true}, nullptr);
-  EXPECT_EQ(palette.Legend().size(), 20U);
-  EXPECT_EQ(palette.Legend()[3].text.toStdString(), "10");
-  EXPECT_EQ(palette.HiddenCodes(), 280U);
-  EXPECT_EQ(QColor(palette.Colors()[palette.ColorNumber(10)]), palette.Legend()[3].color);
+  EXPECT_EQ(palette.Legend().rows.size(), 20U);
+  EXPECT_EQ(palette.Legend().rows[3].text.toStdString(), "10");
+  EXPECT_EQ(palette.Legend().hidden, 280U);
+  EXPECT_EQ(QColor(palette.Colors()[palette.ColorNumber(10)]), palette.Legend().rows[3].color);
   for (int i = 0; i < 300; ++i) EXPECT_NE(palette.ColorNumber(static_cast<float>(i + 7)), 0);
 }
 
@@ -152,7 +152,7 @@ TEST(MapView, ASingleCellOfACodeIsSeenFromAfar) {
   MapContent content;
   content.grids = {{grid, true}};
   ShownMap map(std::move(content));
-  const QColor color = MapPalette::Of({grid, true}, nullptr).Legend()[1].color;
+  const QColor color = MapPalette::Of({grid, true}, nullptr).Legend().rows[1].color;
   const MapPoint cell = grid->CellCentre(1234, 777);
   const QImage picture = map.Canvas().grab().toImage();
   const QPoint at = map.At(cell).toPoint();
@@ -243,7 +243,8 @@ TEST(MapView, TheSameContentLeavesThePictureAndAnotherGridKeepsThePlace) {
   const QColor before = map.ColorAt({525, 525});
   map.View().Show(content, nullptr);
   EXPECT_EQ(map.Canvas().Window().metresPerPixel, zoomed);
-  content.grids = {{Counting(geometry), false, 12.0F}};
+  content.grids = {{Counting(geometry)}};
+  LetStandOut(content, {.code = 12.0F});
   map.View().Show(content, nullptr);
   EXPECT_EQ(map.Canvas().Window().metresPerPixel, zoomed);
   EXPECT_NE(map.ColorAt({525, 525}), before);
