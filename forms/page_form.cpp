@@ -17,9 +17,10 @@
 namespace tervane {
 
 std::string_view KindName(ControlKind kind) {
-  constexpr std::array<std::string_view, 23> names{
-      "check", "radio", "choice", "text", "long text", "integer", "number", "date", "file",  "label",   "button", "table",
-      "shown", "notice", "view",  "text file", "browser", "report", "map",  "chart", "section", "group", "sub-form"};
+  constexpr std::array<std::string_view, 23> names{"check",  "radio",  "choice",  "text",      "long text", "integer",
+                                                   "number", "date",   "file",    "label",     "button",    "table",
+                                                   "shown",  "notice", "view",    "text file", "browser",   "report",
+                                                   "map",    "chart",  "section", "group",     "sub-form"};
   return names[static_cast<std::size_t>(kind)];
 }
 

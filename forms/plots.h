@@ -34,9 +34,9 @@ struct Highlight {
 
 /// How numbers become colours with a legend: as kinds with a name each, or as classes of one scale.
 struct ValueScale {
-  std::string title = {};                                 ///< Above the legend.
-  std::vector<std::pair<double, std::string>> names = {}; ///< Of the kinds, in the legend's order; none for a scale.
-  int itemType = 0, unit = 0;                             ///< Of a scale, which is shown in the user's unit.
+  std::string title = {};                                  ///< Above the legend.
+  std::vector<std::pair<double, std::string>> names = {};  ///< Of the kinds, in the legend's order; none for a scale.
+  int itemType = 0, unit = 0;                              ///< Of a scale, which is shown in the user's unit.
 
   bool operator==(const ValueScale&) const = default;
 };
@@ -44,7 +44,7 @@ struct ValueScale {
 /// A grid on a map.
 struct GridLayer {
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid;
-  bool isCodes = false;  ///< Whole-number codes: one colour each, the classes of the legend are the codes.
+  bool isCodes = false;        ///< Whole-number codes: one colour each, the classes of the legend are the codes.
   Highlight highlighted = {};  ///< With a code two colours: cells of this value, and the others.
   bool withLegend = true;
   double transparency = 0;  ///< 0 opaque, 1 invisible.
@@ -61,8 +61,8 @@ struct ShapeLayer {
   Highlight highlighted = {};
   std::optional<unsigned> lineColor = {};  ///< Red, green, blue; the colour of the theme when nothing is said.
   std::optional<double> lineWidth = {};    ///< In pixels.
-  bool isFilled = false;    ///< Polygons have a quiet colour for each value, and a legend.
-  bool withLabels = false;  ///< Polygons bear their value where it fits.
+  bool isFilled = false;                   ///< Polygons have a quiet colour for each value, and a legend.
+  bool withLabels = false;                 ///< Polygons bear their value where it fits.
 
   bool operator==(const ShapeLayer&) const = default;
 };
@@ -71,16 +71,16 @@ struct ShapeLayer {
 struct MapLine {
   std::string name = {};
   std::vector<MapPoint> points;
-  std::vector<double> chainages = {};   ///< In metres, as many as points, or none: then it counts from the first point.
-  std::optional<double> value = {};     ///< For `LineLayer::painted`.
+  std::vector<double> chainages = {};  ///< In metres, as many as points, or none: then it counts from the first point.
+  std::optional<double> value = {};    ///< For `LineLayer::painted`.
 };
 
 /// Lines over a grid. A line that stands out lies above the others.
 struct LineLayer {
   std::shared_ptr<const std::vector<MapLine>> lines;
   Highlight highlighted = {};
-  bool withPoints = false;  ///< Points are marked, and their chainages told, where there is room.
-  bool withNames = true;    ///< The same for names.
+  bool withPoints = false;                 ///< Points are marked, and their chainages told, where there is room.
+  bool withNames = true;                   ///< The same for names.
   std::optional<ValueScale> painted = {};  ///< Lines are coloured by their value; those without one stay quiet.
   std::optional<unsigned> lineColor = {};  ///< Red, green, blue.
   std::optional<double> lineWidth = {};    ///< In pixels.
@@ -170,8 +170,8 @@ struct Series {
   std::string name;
   std::string unit;
   std::vector<CYbDateTime> times;
-  std::vector<double> values;  ///< As many; NaN for a gap.
-  bool isStepped = false;      ///< The value holds over the interval that ends at its time.
+  std::vector<double> values;          ///< As many; NaN for a gap.
+  bool isStepped = false;              ///< The value holds over the interval that ends at its time.
   std::vector<double> positions = {};  ///< In the place of times, for a chart over numbers (`SeriesContent::numbers`).
   int panel = 0;                       ///< Which of several charts below each other, from 0.
 };
@@ -239,8 +239,8 @@ bool LooksSame(const MapContent& a, const MapContent& b);
 bool LooksSame(const SeriesContent& a, const SeriesContent& b);
 bool LooksSame(const SectionContent& a, const SectionContent& b);
 
-/// In short what is shown, for texts: "grid 142x97, 29 shapes", "2 series, 1461 values", or the message; and what stands
-/// out and is asked for.
+/// In short what is shown, for texts: "grid 142x97, 29 shapes", "2 series, 1461 values", or the message; and what
+/// stands out and is asked for.
 std::string Summary(const MapContent& content);
 std::string Summary(const SeriesContent& content);
 std::string Summary(const SectionContent& content);

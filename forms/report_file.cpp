@@ -71,9 +71,8 @@ ReportFile ReadReport(const std::string& path) {
 }
 
 std::string Summary(const ReportFile& report) {
-  std::string text = report.message.empty()
-                         ? fmt::format("{}, {} bytes", FileNameOf(report.path), report.html.size())
-                         : report.message;
+  std::string text = report.message.empty() ? fmt::format("{}, {} bytes", FileNameOf(report.path), report.html.size())
+                                            : report.message;
   return report.remark.empty() ? text : text + " " + report.remark;
 }
 

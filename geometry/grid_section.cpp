@@ -27,8 +27,7 @@ double BilinearValue(const CTvn2DOrthoRotatedGridData& grid, MapPoint at, int i,
       if (ni < 0 || nj < 0 || ni >= geometry.nx || nj >= geometry.ny) continue;
       const float value = grid.Value(ni, nj);
       if (grid.IsEmptyValue(value)) continue;
-      const double weight =
-          (besideX ? std::abs(dx) : 1 - std::abs(dx)) * (besideY ? std::abs(dy) : 1 - std::abs(dy));
+      const double weight = (besideX ? std::abs(dx) : 1 - std::abs(dx)) * (besideY ? std::abs(dy) : 1 - std::abs(dy));
       sum += weight * static_cast<double>(value);
       weights += weight;
     }
@@ -58,9 +57,9 @@ std::vector<SectionPoint> PointsAlong(const std::vector<MapPoint>& line, double 
     for (; next * step < passed + piece * (1 - 1e-9); ++next) {
       const double part = (next * step - passed) / piece;
       if (part < 1e-9) continue;
-      points.push_back({next * step,
-                        {line[i - 1].x + part * (line[i].x - line[i - 1].x),
-                         line[i - 1].y + part * (line[i].y - line[i - 1].y)}});
+      points.push_back(
+          {next * step,
+           {line[i - 1].x + part * (line[i].x - line[i - 1].x), line[i - 1].y + part * (line[i].y - line[i - 1].y)}});
     }
     passed += piece;
     points.push_back({passed, line[i]});

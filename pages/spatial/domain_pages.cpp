@@ -91,6 +91,17 @@ void CCatchmentDlg::Describe(PageForm& form) {
   GridNumber(grid, "Cell Size:", n.sizeShp, &GridGeometry::cellSize).Quantity(kHorizontalLength);
   GridNumber(grid, "X0:", n.x0Shp, &GridGeometry::x0).Quantity(kHorizontalLength);
   GridNumber(grid, "Y0:", n.y0Shp, &GridGeometry::y0).Quantity(kHorizontalLength);
+  grid.Button("Pick Corner on Map",
+              [this] {
+                question_.AskPoint("Click the lower left corner of the grid. Esc gives up.", [this](MapPoint corner) {
+                  Node().x0Shp = corner.x;
+                  Node().y0Shp = corner.y;
+                  Node().SetRevalidateAll();
+                  UpdateDoc(kDataChanged, "Pick Corner of the Grid");
+                });
+              })
+      .ToolTip("Takes X0 and Y0 from a click on the map")
+      .EnabledWhen(fromShape);
   GridNumber(grid, "Rotation:", n.rotationShp, &GridGeometry::rotation).Unit("[Deg, Counter clockwise]");
   grid.Text(
           "Map Projection Type:", [&n] { return n.GetModelGeometry().projection; },
@@ -104,6 +115,12 @@ void CCatchmentDlg::Describe(PageForm& form) {
 }
 
 MapContent CCatchmentDlg::Map() {
+  MapContent map = DomainMap();
+  question_.PutOn(map);
+  return map;
+}
+
+MapContent CCatchmentDlg::DomainMap() {
   CCatchmentKvf& n = Node();
   if (n.Type == CCatchmentKvf::kGridFile) {
     MapContent map = FileMap(n.GridFile());

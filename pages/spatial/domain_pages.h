@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include "forms/map_question.h"
 #include "forms/page.h"
 #include "forms/plots.h"
 #include "spatial/domain.h"
@@ -11,7 +12,8 @@ namespace tervane {
 /// The model domain and its grid.
 class CCatchmentDlg : public PageOf<CCatchmentKvf> {
  public:
-  using PageOf::PageOf;
+  CCatchmentDlg(CYbSEKvfBase& node, PageContext context)
+      : PageOf(node, std::move(context)), question_(Context().syncSoon) {}
 
  protected:
   void Describe(PageForm& form) override;
@@ -21,6 +23,9 @@ class CCatchmentDlg : public PageOf<CCatchmentKvf> {
   Control& GridNumber(PageForm& form, const std::string& label, double& own, double GridGeometry::*inFile);
   bool BrowseShape(Host& host, const Host::FileQuestion& question);
   MapContent Map();
+  MapContent DomainMap();
+
+  MapQuestion question_;
 };
 
 }  // namespace tervane

@@ -62,6 +62,8 @@ SectionView::SectionView(Host& host, QWidget* parent)
     SetExaggeration(index == 0 ? std::nullopt : std::optional<double>(choice_->itemData(index).toDouble()));
   });
   connect(chart_, &QCustomPlot::beforeReplot, this, &SectionView::Arrange);
+  // The exaggeration depends on the place that the layout leaves.
+  connect(chart_, &QCustomPlot::afterLayout, this, &SectionView::FitHeights);
   connect(chart_, &QCustomPlot::mouseMove, this, &SectionView::PointAt);
   connect(chart_, &QCustomPlot::mouseDoubleClick, this, &SectionView::Fit);
   connect(&Theme::Get(), &Theme::Changed, this, [this] {
@@ -78,8 +80,8 @@ void SectionView::Show(SectionContent content, const DisplayUnits* units) {
   isShown_ = true;
   content_ = std::move(content);
   displayUnits_ = chosen;
-  units_ = std::make_unique<Units>(Units{ShownUnit(kDistanceType, kMetre, &displayUnits_),
-                                         ShownUnit(kElevationType, kMetre, &displayUnits_)});
+  units_ = std::make_unique<Units>(
+      Units{ShownUnit(kDistanceType, kMetre, &displayUnits_), ShownUnit(kElevationType, kMetre, &displayUnits_)});
   Build();
 }
 
@@ -166,7 +168,6 @@ void SectionView::Arrange() {
   chart_->xAxis->ticker()->setTickCount(std::clamp(distances, 2, 9));
   const int heights = chart_->axisRect()->height() / (3 * metrics.height());
   chart_->yAxis->ticker()->setTickCount(std::clamp(heights, 2, 7));
-  FitHeights();
 }
 
 /// Heights follow the distances that are seen: by the exaggeration, or so that they fill the view.
@@ -181,10 +182,11 @@ void SectionView::FitHeights() {
     const double size = metresPerPixel / *exaggeration_ * chart_->axisRect()->height();
     const double middle = units_->height.Stored(heights.range().center());
     heights.setRange(units_->height.Shown(middle - size / 2), units_->height.Shown(middle + size / 2));
-  } else if (const auto range = profile_.Range(units_->distance.Stored(seen.lower),
-                                               units_->distance.Stored(seen.upper))) {
+  } else if (const auto range =
+                 profile_.Range(units_->distance.Stored(seen.lower), units_->distance.Stored(seen.upper))) {
     const double size = range->second > range->first ? range->second - range->first : 1;
-    heights.setRange(units_->height.Shown(range->first - 0.05 * size), units_->height.Shown(range->second + 0.1 * size));
+    heights.setRange(units_->height.Shown(range->first - 0.05 * size),
+                     units_->height.Shown(range->second + 0.1 * size));
   }
   TellExaggeration();
 }
@@ -274,23 +276,41 @@ void SectionView::PointAt(const QMouseEvent* event) {
   pointer_->point1->setCoords(distance, 0);
   pointer_->point2->setCoords(distance, 1);
   chart_->layer(kPointerLayer)->replot();
-  SetStatus(isInside ? TextAt(units_->distance.Stored(distance)) : QString());
+  const double height = chart_->yAxis->pixelToCoord(event->position().y());
+  SetStatus(isInside ? TextAt(units_->distance.Stored(distance), units_->height.Stored(height)) : QString());
+  chart_->setToolTip(isInside ? LayersAt(units_->distance.Stored(distance)) : QString());
 }
 
-QString SectionView::TextAt(double distance) const {
+std::optional<std::size_t> SectionView::SampleAt(double distance) const {
   const auto& points = profile_.points;
   if (points.empty() || distance < 0 || distance > points.back().distance) return {};
   auto next = std::ranges::lower_bound(points, distance, {}, &SectionPoint::distance);
   if (next != points.begin() && distance - (next - 1)->distance < next->distance - distance) --next;
-  const auto at = static_cast<std::size_t>(next - points.begin());
-  const auto height = [this](double value) { return units_->height.Value(std::round(value * 100) / 100); };
-  QString text = tr("at %1").arg(units_->distance.Value(std::round(next->distance)));
-  text += "   " + (std::isnan(profile_.ground[at]) ? tr("no ground")
-                                                    : tr("ground %1").arg(height(profile_.ground[at])));
-  for (const SectionProfile::Band& band : profile_.bands) {
-    const bool isThere = !std::isnan(band.bottom[at]) && !(band.top[at] <= band.bottom[at]);
-    if (isThere) text += "   " + tr("%1 down to %2").arg(ToQt(band.name), height(band.bottom[at]));
-  }
+  return static_cast<std::size_t>(next - points.begin());
+}
+
+QString SectionView::HeightText(double height) const {
+  return std::isnan(height) ? tr("no value") : units_->height.Value(std::round(height * 100) / 100);
+}
+
+QString SectionView::TextAt(double distance, double height) const {
+  const auto at = SampleAt(distance);
+  if (!at) return {};
+  QString text = tr("at %1").arg(units_->distance.Value(std::round(profile_.points[*at].distance)));
+  text += "   " + tr("ground %1").arg(HeightText(profile_.ground[*at]));
+  for (const SectionProfile::Band& band : profile_.bands)
+    if (height < band.top[*at] && height >= band.bottom[*at])
+      text +=
+          "   " + tr("%1 from %2 to %3").arg(ToQt(band.name), HeightText(band.top[*at]), HeightText(band.bottom[*at]));
+  return text;
+}
+
+QString SectionView::LayersAt(double distance) const {
+  const auto at = SampleAt(distance);
+  if (!at) return {};
+  QString text = tr("ground %1").arg(HeightText(profile_.ground[*at]));
+  for (const SectionProfile::Band& band : profile_.bands)
+    text += "\n" + tr("%1 down to %2").arg(ToQt(band.name), HeightText(band.bottom[*at]));
   return text;
 }
 

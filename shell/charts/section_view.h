@@ -36,8 +36,10 @@ class SectionView : public PlotFrame {
   void Show(SectionContent content, const DisplayUnits* units);
   void ShowWhenThere(const std::function<SectionContent()>& content, const DisplayUnits* units);
   QCustomPlot& Chart() const { return *chart_; }
-  /// What the user reads at a distance, in metres: the place, the ground, and each layer from top to bottom.
-  QString TextAt(double distance) const;
+  /// What the user reads at a distance and a height, in metres: the ground there, and the layer that he points at.
+  QString TextAt(double distance, double height) const;
+  /// All layers at a distance, a line for each, from top to bottom.
+  QString LayersAt(double distance) const;
   /// How many times heights are drawn larger than distances now.
   double Exaggeration() const;
   /// Fixes the exaggeration; nothing to let heights fill the view.
@@ -49,6 +51,9 @@ class SectionView : public PlotFrame {
   bool eventFilter(QObject* watched, QEvent* event) override;
 
  private:
+  /// The nearest sample; nothing beside the section.
+  std::optional<std::size_t> SampleAt(double distance) const;
+  QString HeightText(double height) const;
   struct Units;  ///< How the user sees lengths.
 
   void Build();

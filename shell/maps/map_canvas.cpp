@@ -110,6 +110,7 @@ bool MapCanvas::IsPreparing() const {
 }
 
 void MapCanvas::WaitUntilReady() {
+  if (!IsPreparing()) return;
   for (const auto& layer : layers_) {
     if (layer->picture) continue;
     layer->watcher.waitForFinished();
@@ -354,6 +355,8 @@ void MapCanvas::DrawVectors(QPainter& painter, double pixelRatio, bool isScreen)
     }
   } else {
     scene.picture = QPixmap(pixels);
+    // Without this a picture has no transparency.
+    scene.picture.fill(Qt::transparent);
     scene.picture.setDevicePixelRatio(pixelRatio);
     scene.window = window_;
   }
@@ -361,12 +364,13 @@ void MapCanvas::DrawVectors(QPainter& painter, double pixelRatio, bool isScreen)
   QPainter inner(&scene.picture);
   for (const QRect& part : missing) {
     const QRectF place(QPointF(part.topLeft()) / pixelRatio, QSizeF(part.size()) / pixelRatio);
-    map.part = place & window_.rect;
+    // Also what the frame hides now: it comes into view when the map is moved.
+    map.part = place;
     inner.setClipRect(place);
     inner.setCompositionMode(QPainter::CompositionMode_Source);
     inner.fillRect(place, Qt::transparent);
     inner.setCompositionMode(QPainter::CompositionMode_SourceOver);
-    if (!map.part.isEmpty()) DrawVectorPart(inner, map);
+    DrawVectorPart(inner, map);
   }
   inner.end();
   painter.drawPixmap(0, 0, scene.picture);

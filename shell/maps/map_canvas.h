@@ -86,7 +86,7 @@ class MapCanvas : public QWidget {
   /// What is asked of the user and what he has drawn so far.
   void DrawRequest(QPainter& painter);
   void SyncCursor();
-  void TakeClick(MapPoint place);
+  void TakeClick(MapPoint clicked);
   void EndLine();
   void Answer();
   void GiveUp();

@@ -38,8 +38,8 @@ std::optional<Envelope> EnvelopeAround(std::span<const MapPoint> points) {
 
 void Extend(std::optional<Envelope>& area, const std::optional<Envelope>& by) {
   if (!by) return;
-  area = area ? Envelope{std::min(area->xMin, by->xMin), std::min(area->yMin, by->yMin),
-                         std::max(area->xMax, by->xMax), std::max(area->yMax, by->yMax)}
+  area = area ? Envelope{std::min(area->xMin, by->xMin), std::min(area->yMin, by->yMin), std::max(area->xMax, by->xMax),
+                         std::max(area->yMax, by->yMax)}
               : *by;
 }
 
@@ -144,6 +144,22 @@ void DrawEdgedLines(QPainter& painter, const std::vector<QPolygonF>& lines, cons
     painter.setPen(pen);
     for (const QPolygonF& line : lines) painter.drawPolyline(line);
   }
+}
+
+void DrawPlainLines(QPainter& painter, const std::vector<QPolygonF>& lines, const QColor& color, double width) {
+  // Single segments with square ends are what the painter draws fast.
+  painter.setPen(QPen(color, width, Qt::SolidLine, Qt::SquareCap));
+  QVector<QLineF> segments;
+  for (const QPolygonF& line : lines)
+    for (qsizetype i = 1; i < line.size(); ++i) segments.emplace_back(line[i - 1], line[i]);
+  painter.drawLines(segments);
+}
+
+void DrawFineLines(QPainter& painter, const std::vector<QPolygonF>& lines, const QColor& color) {
+  painter.setRenderHint(QPainter::Antialiasing, false);
+  painter.setPen(QPen(color, 0));
+  for (const QPolygonF& line : lines) painter.drawPolyline(line);
+  painter.setRenderHint(QPainter::Antialiasing);
 }
 
 void DrawMarker(QPainter& painter, QPointF at, bool isHighlighted, double zoom) {

@@ -66,6 +66,10 @@ QColor LineColor(bool isDark);
 /// Lines with an edge around them; those of one call share it, so that none lies over another's line.
 void DrawEdgedLines(QPainter& painter, const std::vector<QPolygonF>& lines, const QColor& color, double width,
                     const DrawnMap& map);
+/// Many lines, without an edge.
+void DrawPlainLines(QPainter& painter, const std::vector<QPolygonF>& lines, const QColor& color, double width);
+/// Very many lines, as fine as the screen draws them.
+void DrawFineLines(QPainter& painter, const std::vector<QPolygonF>& lines, const QColor& color);
 void DrawMarker(QPainter& painter, QPointF at, bool isHighlighted, double zoom);
 
 }  // namespace tervane

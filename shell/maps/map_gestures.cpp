@@ -159,7 +159,10 @@ void MapCanvas::Ask(std::optional<MapRequest> request) {
 
 void MapCanvas::SyncCursor() { setCursor(request_ ? TargetCursor(Theme::Get().Zoom()) : QCursor(Qt::CrossCursor)); }
 
-void MapCanvas::TakeClick(MapPoint place) {
+void MapCanvas::TakeClick(MapPoint clicked) {
+  // No more digits than a pixel tells apart.
+  const double step = std::pow(10.0, std::floor(std::log10(window_.metresPerPixel)));
+  const MapPoint place{std::round(clicked.x / step) * step, std::round(clicked.y / step) * step};
   if (request_->kind == MapRequest::Kind::Line) {
     if (drawn_.empty() || !(drawn_.back() == place)) drawn_.push_back(place);
     return update();

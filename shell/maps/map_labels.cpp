@@ -30,9 +30,8 @@ void LabelPlaces::Take(const QRectF& place) {
   });
 }
 
-bool LabelPlaces::IsFree(const QRectF& place) const {
-  if (!limits_.contains(place)) return false;
-  return !AnyBucket(place, [&](long long bucket) {
+bool LabelPlaces::IsTaken(const QRectF& place) const {
+  return AnyBucket(place, [&](long long bucket) {
     const auto found = taken_.find(bucket);
     return found != taken_.end() &&
            std::ranges::any_of(found->second, [&](const QRectF& other) { return other.intersects(place); });
@@ -40,7 +39,7 @@ bool LabelPlaces::IsFree(const QRectF& place) const {
 }
 
 bool LabelPlaces::Draw(QPainter& painter, const QRectF& place, const QString& text, const DrawnMap& map) {
-  if (IsFull() || !IsFree(place)) return false;
+  if (IsFull() || !limits_.contains(place) || IsTaken(place)) return false;
   ++names_;
   Take(place.adjusted(-2, -1, 2, 1));
   QColor edge = EdgeColor(map.isDark);
@@ -58,8 +57,8 @@ bool LabelPlaces::DrawAround(QPainter& painter, QPointF marker, double radius, c
                                        QPointF(-w / 2, -gap - h),  QPointF(-w / 2, gap),
                                        QPointF(slant, -slant - h), QPointF(-slant - w, -slant - h),
                                        QPointF(slant, slant),      QPointF(-slant - w, slant)};
-  return std::ranges::any_of(
-      corners, [&](QPointF corner) { return Draw(painter, QRectF(marker + corner, size), text, map); });
+  return std::ranges::any_of(corners,
+                             [&](QPointF corner) { return Draw(painter, QRectF(marker + corner, size), text, map); });
 }
 
 bool LabelPlaces::DrawAt(QPainter& painter, QPointF middle, const QString& text, const DrawnMap& map) {
@@ -109,6 +108,8 @@ void DrawOutlinedText(QPainter& painter, QPointF baseline, const QString& text, 
 
 namespace {
 
+constexpr double kMarkerReach = 4;  ///< Of a marker without a number, in pixels at zoom 1.
+
 QFont NumberFont(const QFont& font) {
   QFont small = font;
   small.setPointSizeF(font.pointSizeF() * 0.8);
@@ -133,7 +134,7 @@ void DrawNumbered(QPainter& painter, QPointF at, std::size_t number, bool isHigh
 
 }  // namespace
 
-double MarkerReach(const PointLayer& layer, double zoom) { return (layer.isNumbered ? 8.5 : 4.0) * zoom; }
+double MarkerReach(const PointLayer& layer, double zoom) { return (layer.isNumbered ? 8.5 : kMarkerReach) * zoom; }
 
 void DrawLabelledPoints(QPainter& painter, const PointLayer& layer, const DrawnMap& map, LabelPlaces& places) {
   const QRectF limits = map.part.adjusted(-10, -10, 10, 10);
@@ -143,24 +144,28 @@ void DrawLabelledPoints(QPainter& painter, const PointLayer& layer, const DrawnM
   std::vector<std::pair<QPointF, std::size_t>> seen;
   for (std::size_t i = 0; i < layer.points.size(); ++i)
     if (const QPointF at = map.window.ToScreen(layer.points[i]); limits.contains(at)) seen.emplace_back(at, i);
-  // Numbers are of use where they do not cover each other.
-  constexpr std::size_t kMostNumbers = 500;
-  const bool haveNumbers = layer.isNumbered && seen.size() <= kMostNumbers;
-  // Those that stand out lie above the others, and get their names first.
-  std::ranges::stable_partition(seen, [&](const auto& point) { return !standsOut(point.second); });
+  // Those that stand out lie above the others, and get their numbers and names first.
+  std::ranges::stable_partition(seen, [&](const auto& point) { return standsOut(point.second); });
+  // Where numbers would cover each other, a marker without one stands.
+  std::vector<bool> hasNumber;
   for (const auto& [at, i] : seen) {
-    if (haveNumbers)
+    const QRectF disc(at.x() - reach, at.y() - reach, 2 * reach, 2 * reach);
+    hasNumber.push_back(layer.isNumbered && (standsOut(i) || !places.IsTaken(disc)));
+    const double small = hasNumber.back() ? reach : kMarkerReach * map.zoom;
+    places.Take({at.x() - small, at.y() - small, 2 * small, 2 * small});
+  }
+  for (std::size_t k = seen.size(); k-- > 0;) {
+    const auto& [at, i] = seen[k];
+    if (hasNumber[k])
       DrawNumbered(painter, at, i + 1, standsOut(i), reach, map.zoom);
     else
       DrawMarker(painter, at, standsOut(i), map.zoom);
-    places.Take({at.x() - reach, at.y() - reach, 2 * reach, 2 * reach});
   }
   constexpr std::size_t kMostLabels = 400;  // beyond, a map is full of names anyway
   if (!areNamed || seen.size() > kMostLabels) return;
-  for (const bool first : {true, false})
-    for (const auto& [at, i] : seen)
-      if (standsOut(i) == first && !layer.labels[i].empty())
-        places.DrawAround(painter, at, reach, ToQt(layer.labels[i]), map);
+  for (std::size_t k = 0; k < seen.size(); ++k)
+    if (const auto& [at, i] = seen[k]; !layer.labels[i].empty())
+      places.DrawAround(painter, at, hasNumber[k] ? reach : kMarkerReach * map.zoom, ToQt(layer.labels[i]), map);
 }
 
 }  // namespace tervane

@@ -23,8 +23,8 @@ class LabelPlaces {
   explicit LabelPlaces(QRectF limits) : limits_(limits) {}
 
   void Take(const QRectF& place);
-  bool IsFree(const QRectF& place) const;
-  /// No name stands here yet, which a map full of names needs not be asked any more.
+  bool IsTaken(const QRectF& place) const;
+  /// The map is so full of names that no further one is of use.
   bool IsFull() const { return names_ >= kMostNames; }
 
   /// Draws a text at the first free of the places around a marker: beside, above, below, then the corners. False when

@@ -15,17 +15,19 @@ namespace {
 
 constexpr std::size_t kPointsOfPiece = 64;
 constexpr double kWidth = 1.8, kPaintedWidth = 3.4, kHighlightedWidth = 3.2;  ///< In pixels at zoom 1.
+/// Beyond, edges would hide what they keep apart, and take long; beyond still more, lines are as fine as can be.
+constexpr double kManySegments = 1000, kVeryManySegments = 8000;
+constexpr double kRoomOfPoint = 12, kRoomOfChainage = 45;
 
 }  // namespace
 
 LinePicture::LinePicture(LineLayer layer, const DisplayUnits& units) : layer_(std::move(layer)) {
   std::vector<double> values;
-  double length = 0;
   std::size_t points = 0;
   for (std::size_t number = 0; number < layer_.lines->size(); ++number) {
     const MapLine& line = Line(number);
     if (line.value) values.push_back(*line.value);
-    length += LengthOf(line.points);
+    length_ += LengthOf(line.points);
     points += line.points.size();
     // Pieces share the point between them.
     for (std::size_t first = 0; first < line.points.size(); first += kPointsOfPiece) {
@@ -36,13 +38,22 @@ LinePicture::LinePicture(LineLayer layer, const DisplayUnits& units) : layer_(st
       Extend(area_, around);
     }
   }
-  if (points > 0) spacing_ = length / static_cast<double>(points);
+  if (points > 0) spacing_ = length_ / static_cast<double>(points);
   if (layer_.painted) colors_ = ValueColors(*layer_.painted, values, &units);
 }
 
-bool LinePicture::HasRoomForPoints(const DrawnMap& map) const {
-  constexpr double kRoom = 12;  // pixels at zoom 1
-  return layer_.withPoints && spacing_ > kRoom * map.zoom * map.window.metresPerPixel;
+bool LinePicture::HasRoomForPoints(const DrawnMap& map, double pixels) const {
+  return layer_.withPoints && spacing_ > pixels * map.zoom * map.window.metresPerPixel;
+}
+
+/// What a window anywhere on the layer shows, on an average: lines must look alike in all strips that a moved map adds.
+double LinePicture::EstimatedSegments(const DrawnMap& map) const {
+  if (!area_) return 0;
+  const double metres = map.window.metresPerPixel, width = area_->xMax - area_->xMin,
+               height = area_->yMax - area_->yMin;
+  const double seen = std::min(1.0, map.window.rect.width() * metres / std::max(width, metres)) *
+                      std::min(1.0, map.window.rect.height() * metres / std::max(height, metres));
+  return seen * length_ / std::max(spacing_, metres);
 }
 
 void LinePicture::Draw(QPainter& painter, const DrawnMap& map) const {
@@ -54,18 +65,24 @@ void LinePicture::Draw(QPainter& painter, const DrawnMap& map) const {
   std::vector<QPolygonF> highlighted;
   for (const Piece& piece : seen) {
     const MapLine& line = Line(piece.line);
-    std::vector<QPolygonF>& kind =
-        StandsOut(piece.line) ? highlighted
-        : layer_.painted      ? lines[line.value ? colors_.Number(*line.value) : colors_.Colors().size() - 1]
-                              : lines.front();
+    std::vector<QPolygonF>& kind = StandsOut(piece.line) ? highlighted
+                                   : layer_.painted
+                                       ? lines[line.value ? colors_.Number(*line.value) : colors_.Colors().size() - 1]
+                                       : lines.front();
     AddScreenLine(kind, std::span(line.points).subspan(piece.first, piece.count), false, map);
   }
+  const double segments = EstimatedSegments(map);
+  const auto draw = [&](const std::vector<QPolygonF>& drawn, const QColor& color, double width) {
+    if (segments > kVeryManySegments) return DrawFineLines(painter, drawn, color);
+    segments > kManySegments ? DrawPlainLines(painter, drawn, color, width * map.zoom)
+                             : DrawEdgedLines(painter, drawn, color, width, map);
+  };
   const QColor plain = layer_.lineColor ? QColor::fromRgb(*layer_.lineColor) : LineColor(map.isDark);
   const double width = layer_.lineWidth.value_or(layer_.painted ? kPaintedWidth : kWidth);
   for (std::size_t kind = 0; kind < lines.size(); ++kind)
-    DrawEdgedLines(painter, lines[kind], layer_.painted ? colors_.Colors()[kind] : plain, width, map);
+    draw(lines[kind], layer_.painted ? colors_.Colors()[kind] : plain, width);
   DrawEdgedLines(painter, highlighted, kHighlightColor, std::max(width, kHighlightedWidth), map);
-  if (HasRoomForPoints(map)) DrawPoints(painter, map, seen);
+  if (HasRoomForPoints(map, kRoomOfPoint)) DrawPoints(painter, map, seen);
 }
 
 void LinePicture::DrawPoints(QPainter& painter, const DrawnMap& map, const std::vector<Piece>& seen) const {
@@ -91,10 +108,11 @@ void LinePicture::DrawLabels(QPainter& painter, const DrawnMap& map, LabelPlaces
       if (line.name.empty() || StandsOut(piece.line) != first || named.contains(piece.line)) continue;
       if (!Overlap(piece.around, seenArea)) continue;
       const QPointF at = map.window.ToScreen(line.points[piece.first + piece.count / 2]);
-      if (map.part.contains(at) && places.DrawAround(painter, at, reach, ToQt(line.name), map)) named.insert(piece.line);
+      if (map.part.contains(at) && places.DrawAround(painter, at, reach, ToQt(line.name), map))
+        named.insert(piece.line);
     }
   }
-  if (!HasRoomForPoints(map)) return;
+  if (!HasRoomForPoints(map, kRoomOfChainage)) return;
   for (const Piece& piece : pieces_) {
     if (places.IsFull()) return;
     const MapLine& line = Line(piece.line);

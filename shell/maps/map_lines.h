@@ -46,14 +46,15 @@ class LinePicture {
   const MapLine& Line(std::size_t number) const { return (*layer_.lines)[number]; }
   bool StandsOut(std::size_t line) const { return layer_.highlighted.IsOf(line, Line(line).name); }
   double ChainageAt(const MapLine& line, std::size_t segment, MapPoint place) const;
-  /// Points of the network stand apart at this scale.
-  bool HasRoomForPoints(const DrawnMap& map) const;
+  /// Points of the network stand so many pixels apart at this scale.
+  bool HasRoomForPoints(const DrawnMap& map, double pixels) const;
+  double EstimatedSegments(const DrawnMap& map) const;
   void DrawPoints(QPainter& painter, const DrawnMap& map, const std::vector<Piece>& seen) const;
 
   LineLayer layer_;
   std::vector<Piece> pieces_;
   std::optional<Envelope> area_;
-  double spacing_ = 0;  ///< Metres between points, on an average.
+  double length_ = 0, spacing_ = 0;  ///< Metres of all lines, and between points on an average.
   ValueColors colors_;
 };
 

@@ -41,7 +41,8 @@ void MapCanvas::DrawFrame(QPainter& painter) {
       const double y = window_.ToScreen({0, unit.Stored(i * step)}).y(), x = window_.rect.left();
       const QString text = NumberInSteps(i * step, step);
       const double half = metrics.horizontalAdvance(text) / 2;
-      if (y - half < 0 || y + half > height()) continue;
+      // Below the frame it would meet the first label of the other axis.
+      if (y - half < 0 || y + half > window_.rect.bottom() + tick) continue;
       painter.drawLine(QPointF(x, y), QPointF(x - tick, y));
       painter.save();
       painter.translate(x - tick - metrics.descent(), y + half);

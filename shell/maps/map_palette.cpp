@@ -149,7 +149,7 @@ void ValueColors::MakeClasses(const std::vector<double>& values) {
     range = {std::min(range->first, value), std::max(range->second, value)};
   }
   if (range) {
-    const std::vector<double> shown = ClassBorders(unit_.Shown(range->first),unit_.Shown(range->second));
+    const std::vector<double> shown = ClassBorders(unit_.Shown(range->first), unit_.Shown(range->second));
     for (const double border : shown) borders_.push_back(unit_.Stored(border));
     if (shown.size() == 1) {
       borders_.push_back(borders_.front());

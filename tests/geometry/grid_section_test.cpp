@@ -63,8 +63,15 @@ TEST(GridSection, PointsStandAtStepsCornersAndTheEnd) {
 TEST(GridSection, NearestTellsTheCellAndEmptyCellsAndPlacesOffTheGridAreGaps) {
   const auto grid = Grid({3, 2, 10, 100, 200, 0, {}}, {1, kEmpty, 3, 4, 5, std::nanf("")});
   std::vector<SectionPoint> points;
-  for (const MapPoint place : {MapPoint{101, 201}, {109.9, 209.9}, {115, 205}, {125, 205}, {125, 215}, {99.9, 205},
-                               {130, 205}, {105, 220}, {std::nan(""), 205}})
+  for (const MapPoint place : {MapPoint{101, 201},
+                               {109.9, 209.9},
+                               {115, 205},
+                               {125, 205},
+                               {125, 215},
+                               {99.9, 205},
+                               {130, 205},
+                               {105, 220},
+                               {std::nan(""), 205}})
     points.push_back({0, place});
   EXPECT_THAT(ValuesAlong(grid, points, GridSampling::Nearest),
               ElementsAre(1, 1, IsNan(), 3, IsNan(), IsNan(), IsNan(), IsNan(), IsNan()));
@@ -90,9 +97,9 @@ TEST(GridSection, BilinearValuesFollowAPlaneAlsoOnATurnedGrid) {
 TEST(GridSection, AnEmptyNeighbourLeavesItsWeightToTheOthersAndItsOwnCellIsAGap) {
   const auto grid = Grid({2, 2, 10, 0, 0, 0, {}}, {1, kEmpty, 3, 7});
   const std::vector<SectionPoint> points{{0, {9.9, 5}}, {0, {10.1, 5}}, {0, {10, 10}}, {0, {1, 1}}, {0, {5, 10}}};
-  EXPECT_THAT(ValuesAlong(grid, points, GridSampling::Bilinear),
-              ElementsAre(DoubleNear(1, 1e-9), IsNan(), DoubleNear(11.0 / 3, 1e-6), DoubleNear(1, 1e-9),
-                          DoubleNear(2, 1e-9)));
+  EXPECT_THAT(
+      ValuesAlong(grid, points, GridSampling::Bilinear),
+      ElementsAre(DoubleNear(1, 1e-9), IsNan(), DoubleNear(11.0 / 3, 1e-6), DoubleNear(1, 1e-9), DoubleNear(2, 1e-9)));
 }
 
 }  // namespace
