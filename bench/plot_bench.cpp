@@ -89,6 +89,56 @@ void MeasureMap(const std::string& what, double rotation, bool isCodes) {
   }
 }
 
+/// 100 rivers of 1000 points each that wind over the area of the grid.
+std::shared_ptr<const std::vector<MapLine>> LargeNetwork() {
+  auto network = std::make_shared<std::vector<MapLine>>(100);
+  for (std::size_t river = 0; river < network->size(); ++river) {
+    MapLine& line = (*network)[river];
+    line.name = fmt::format("River {}", river + 1);
+    for (int i = 0; i < 1000; ++i) {
+      const double along = i * 125.0;
+      line.points.push_back(
+          {400000 + along + 300 * std::sin(i * 1.7),
+           5000000 + 1250.0 * static_cast<double>(river) + 900 * std::sin(i / 9.0 + static_cast<double>(river))});
+      line.chainages.push_back(along);
+    }
+  }
+  return network;
+}
+
+void MeasureNetwork() {
+  MapContent content;
+  content.grids = {{LargeGrid(0, false)}};
+  content.lines = {{LargeNetwork()}};
+  content.lines[0].withPoints = true;
+  NobodyToAsk host;
+  MapView view(host);
+  view.resize(kSize);
+  view.Show(content, nullptr);
+  view.show();
+  view.Canvas().WaitUntilReady();
+  QApplication::processEvents();
+  for (const double zoom : {1.0, 8.0}) {
+    view.Canvas().Fit();
+    view.Canvas().Zoom(zoom);
+    view.Canvas().repaint();
+    // Zooming by a little draws all lines anew.
+    Tell(fmt::format("a network of 100,000 points over it, zoom {}: drawn", zoom), MedianOf([&] {
+           view.Canvas().Zoom(1.0001);
+           view.Canvas().repaint();
+         }),
+         50, "ms");
+    std::vector<double> frames;
+    for (int i = 0; i < kFrames; ++i)
+      frames.push_back(Milliseconds([&] {
+        view.Canvas().Pan({i % 2 == 0 ? 7.0 : -5.0, 3.0});
+        view.Canvas().repaint();
+      }));
+    Tell("  the same: a frame of panning", Median(frames), 1000.0 / 60, "ms");
+    Tell("  the same: what is under the pointer", MedianOf([&] { view.Canvas().TextAt({460000, 5060000}); }), 5, "ms");
+  }
+}
+
 void MeasurePeer() {
   QImage image(kSide, kSide, QImage::Format_RGB32);
   image.fill(Qt::darkCyan);
@@ -236,6 +286,7 @@ void Measure() {
   MeasureMap("25 million cells", 0, false);
   MeasureMap("25 million cells, turned", 20, false);
   MeasureMap("25 million codes, turned", 20, true);
+  MeasureNetwork();
   MeasurePeer();
   MeasureInterpolation();
   MeasureViewer();

@@ -10,6 +10,7 @@
 #include <fmt/ranges.h>
 
 #include "forms/plots.h"
+#include "forms/report_file.h"
 #include "forms/table_form.h"
 #include "platform/paths.h"
 #include "platform/text.h"
@@ -17,9 +18,10 @@
 namespace tervane {
 
 std::string_view KindName(ControlKind kind) {
-  constexpr std::array<std::string_view, 21> names{
-      "check", "radio", "choice", "text", "long text", "integer", "number", "date",  "file",  "label",   "button",
-      "table", "shown", "notice", "view", "text file", "browser", "map",    "chart", "group", "sub-form"};
+  constexpr std::array<std::string_view, 23> names{"check",  "radio",  "choice",  "text",      "long text", "integer",
+                                                   "number", "date",   "file",    "label",     "button",    "table",
+                                                   "shown",  "notice", "view",    "text file", "browser",   "report",
+                                                   "map",    "chart",  "section", "group",     "sub-form"};
   return names[static_cast<std::size_t>(kind)];
 }
 
@@ -266,6 +268,12 @@ Control& PageForm::Browser(std::function<std::string()> page) {
   return control;
 }
 
+Control& PageForm::Report(std::function<std::string()> path) {
+  Control& control = Add(ControlKind::Report, {});
+  control.text = std::move(path);
+  return control;
+}
+
 Control& PageForm::Table(std::shared_ptr<TableForm> table) {
   Control& control = Add(ControlKind::Table, {});
   table->SetNode(&node_);
@@ -282,6 +290,12 @@ Control& PageForm::Map(std::function<MapContent()> content) {
 Control& PageForm::Chart(std::function<SeriesContent()> content) {
   Control& control = Add(ControlKind::Chart, {});
   control.chart = std::move(content);
+  return control;
+}
+
+Control& PageForm::Section(std::function<SectionContent()> content) {
+  Control& control = Add(ControlKind::Section, {});
+  control.section = std::move(content);
   return control;
 }
 
@@ -346,6 +360,10 @@ std::string ShownValue(const Control& control) {
       return " = " + Replaced(Summary(Finished(control.map)), "\n", "\\n");
     case ControlKind::Chart:
       return " = " + Replaced(Summary(Finished(control.chart)), "\n", "\\n");
+    case ControlKind::Section:
+      return " = " + Replaced(Summary(Finished(control.section)), "\n", "\\n");
+    case ControlKind::Report:
+      return " = " + Summary(ReadReport(control.Text()));
     case ControlKind::Label:
     case ControlKind::Button:
     case ControlKind::Group:

@@ -27,6 +27,7 @@ class DataFileNode;
 class PageForm;
 class TableForm;
 struct MapContent;
+struct SectionContent;
 struct SeriesContent;
 
 /// Bits of a change that views are told of.
@@ -58,12 +59,18 @@ enum class ControlKind {
   TextView,  ///< A text that is only read.
   TextFile,  ///< The text of a file, which is read as far as the user looks.
   Browser,   ///< A page in HTML.
+  Report,    ///< A file in HTML, which may also be seen in the user's browser.
   Map,       ///< Grids, shapes and points from above.
   Chart,     ///< Curves over time.
+  Section,   ///< A cut through the ground along a line of a map.
   Group,     ///< A frame with a title around further controls.
   SubForms,  ///< A place at which one of several forms stands.
 };
 std::string_view KindName(ControlKind kind);
+/// A map, chart or section, which stands beside the form.
+constexpr bool IsPlot(ControlKind kind) {
+  return kind == ControlKind::Map || kind == ControlKind::Chart || kind == ControlKind::Section;
+}
 
 /// A condition of a page, over what it knows.
 inline Condition Sentence(std::string sentence, std::function<bool()> rule) {
@@ -107,6 +114,7 @@ class Control {
   std::shared_ptr<TableForm> table;
   std::function<MapContent()> map;       ///< What a map shows now.
   std::function<SeriesContent()> chart;  ///< What a chart shows now.
+  std::function<SectionContent()> section;
 
   bool IsEnabled() const { return enabledWhen.Holds(*pageNode); }
   bool IsShown() const { return shownWhen.Holds(*pageNode); }
@@ -196,6 +204,8 @@ class PageForm {
   /// The text of the file at a path.
   Control& TextFile(std::function<std::string()> path);
   Control& Browser(std::function<std::string()> page);
+  /// The HTML file at a path, with all that it names beside it; what is missing or cannot be shown is told in words.
+  Control& Report(std::function<std::string()> path);
   /// A value that is only shown.
   Control& Shown(std::string label, std::function<std::string()> text);
   Control& Table(std::shared_ptr<TableForm> table);
@@ -204,6 +214,8 @@ class PageForm {
   Control& Map(std::function<MapContent()> content);
   /// The same for a chart.
   Control& Chart(std::function<SeriesContent()> content);
+  /// The same for a section.
+  Control& Section(std::function<SectionContent()> content);
   /// A frame with a title; the controls are added to the form that it holds.
   PageForm& Group(std::string title, Condition shownWhen = {});
   /// The same, in one row with the group before it.

@@ -9,11 +9,28 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include "geometry/grid_section.h"
+
 namespace tervane {
 
+bool Highlight::IsOfShape(std::size_t itsPlace, const Shape& shape) const {
+  return IsOf(itsPlace, name.empty() || !shape.HasValue() ? std::string() : TextOf(shape.Value()));
+}
+
+void LetStandOut(MapContent& map, const Highlight& highlighted) {
+  if (!map.grids.empty()) map.grids.front().highlighted = highlighted;
+  if (!map.shapes.empty()) map.shapes.front().highlighted = highlighted;
+  if (!map.lines.empty()) map.lines.front().highlighted = highlighted;
+  if (!map.points.empty()) map.points.front().highlighted = highlighted;
+}
+
 bool LooksSame(const MapContent& a, const MapContent& b) {
-  return a.grids == b.grids && a.shapes == b.shapes && a.points == b.points && a.area == b.area &&
+  return a.grids == b.grids && a.shapes == b.shapes && a.lines == b.lines && a.points == b.points && a.area == b.area &&
          a.message == b.message;
+}
+
+bool LooksSame(const SectionContent& a, const SectionContent& b) {
+  return a.line == b.line && a.ground == b.ground && a.surfaces == b.surfaces && a.message == b.message;
 }
 
 namespace {
@@ -23,35 +40,91 @@ bool LooksSame(const Series& a, const Series& b) {
   const auto sameBits = [](double x, double y) {
     return std::bit_cast<std::uint64_t>(x) == std::bit_cast<std::uint64_t>(y);
   };
-  return a.name == b.name && a.unit == b.unit && a.isStepped == b.isStepped && a.times == b.times &&
+  return a.name == b.name && a.unit == b.unit && a.isStepped == b.isStepped && a.panel == b.panel &&
+         a.times == b.times && std::ranges::equal(a.positions, b.positions, sameBits) &&
          std::ranges::equal(a.values, b.values, sameBits);
 }
 
 }  // namespace
 
 bool LooksSame(const SeriesContent& a, const SeriesContent& b) {
-  return a.period == b.period && a.message == b.message &&
+  const auto sameMarker = [](const DateMarker& x, const DateMarker& y) {
+    return x.name == y.name && x.time == y.time && !x.moved == !y.moved;
+  };
+  return a.period == b.period && a.message == b.message && a.numbers == b.numbers &&
+         std::ranges::equal(a.markers, b.markers, sameMarker) &&
          std::ranges::equal(a.series, b.series, [](const Series& x, const Series& y) { return LooksSame(x, y); });
 }
 
+namespace {
+
+std::string HighlightText(const MapContent& content) {
+  std::vector<Highlight> all;
+  const auto collect = [&all](const auto& layers) {
+    for (const auto& layer : layers)
+      if (!layer.highlighted.IsNone() && std::ranges::find(all, layer.highlighted) == all.end())
+        all.push_back(layer.highlighted);
+  };
+  collect(content.grids);
+  collect(content.shapes);
+  collect(content.lines);
+  collect(content.points);
+  std::vector<std::string> texts;
+  for (const Highlight& one : all) {
+    if (one.code) texts.push_back(fmt::format("code {}", *one.code));
+    if (!one.name.empty()) texts.push_back(fmt::format("\"{}\"", one.name));
+    if (one.place) texts.push_back(fmt::format("number {}", *one.place + 1));
+  }
+  return texts.empty() ? std::string() : fmt::format("{} standing out", fmt::join(texts, ", "));
+}
+
+}  // namespace
+
 std::string Summary(const MapContent& content) {
-  if (content.IsEmpty()) return content.message;
   std::vector<std::string> parts;
+  if (content.IsEmpty()) parts.push_back(content.message);
   for (const GridLayer& layer : content.grids)
     parts.push_back(fmt::format("grid {}x{}", layer.grid->Geometry().nx, layer.grid->Geometry().ny));
   std::size_t shapes = 0, points = 0;
   for (const ShapeLayer& layer : content.shapes) shapes += layer.shapes->GetData().size();
   for (const PointLayer& layer : content.points) points += layer.points.size();
   if (!content.shapes.empty()) parts.push_back(fmt::format("{} shapes", shapes));
+  for (const LineLayer& layer : content.lines) {
+    std::size_t vertices = 0;
+    for (const MapLine& line : *layer.lines) vertices += line.points.size();
+    parts.push_back(fmt::format("{} lines of {} points", layer.lines->size(), vertices));
+    if (layer.painted) parts.back() += " by " + layer.painted->title;
+  }
   if (!content.points.empty()) parts.push_back(fmt::format("{} points", points));
+  if (std::string standsOut = HighlightText(content); !standsOut.empty()) parts.push_back(std::move(standsOut));
+  if (content.request) parts.push_back(fmt::format("asks \"{}\"", content.request->prompt));
   return fmt::format("{}", fmt::join(parts, ", "));
+}
+
+std::string Summary(const SectionContent& content) {
+  if (content.IsEmpty()) return content.message;
+  std::vector<std::string> names{"ground"};
+  for (const SectionSurface& surface : content.surfaces) names.push_back(surface.name);
+  return fmt::format("section of {:.0f} m: {}", LengthOf(content.line), fmt::join(names, ", "));
 }
 
 std::string Summary(const SeriesContent& content) {
   if (content.IsEmpty()) return content.message;
   std::size_t values = 0;
-  for (const Series& series : content.series) values += series.values.size();
-  return fmt::format("{} series, {} values", content.series.size(), values);
+  int charts = 1;
+  for (const Series& series : content.series) {
+    values += series.values.size();
+    charts = std::max(charts, series.panel + 1);
+  }
+  std::string text = fmt::format("{} series, {} values", content.series.size(), values);
+  if (charts > 1) text += fmt::format(", in {} charts", charts);
+  if (content.numbers)
+    text += fmt::format(", over {} [{}]{}", content.numbers->title, content.numbers->unit,
+                        content.numbers->isLogarithmic ? ", logarithmic" : "");
+  for (const DateMarker& marker : content.markers)
+    text += fmt::format(", {} at {}", marker.name, marker.time.Format("%Y-%m-%d %H:%M"));
+  if (content.request) text += fmt::format(", asks \"{}\"", content.request->prompt);
+  return text;
 }
 
 }  // namespace tervane

@@ -8,6 +8,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "geometry/grid.h"
@@ -17,15 +18,39 @@
 
 namespace tervane {
 
+/// The one thing of a layer that stands out from the others.
+struct Highlight {
+  std::optional<float> code = {};         ///< Cells of a grid with this value.
+  std::string name = {};                  ///< Shapes of this value, points and lines of this name; empty for none.
+  std::optional<std::size_t> place = {};  ///< The shape, point or line of this place from 0.
+
+  bool IsOf(std::size_t itsPlace, std::string_view itsName) const {
+    return place == itsPlace || (!name.empty() && name == itsName);
+  }
+  bool IsOfShape(std::size_t itsPlace, const Shape& shape) const;
+  bool IsNone() const { return *this == Highlight(); }
+  bool operator==(const Highlight&) const = default;
+};
+
+/// How numbers become colours with a legend: as kinds with a name each, or as classes of one scale.
+struct ValueScale {
+  std::string title = {};                                  ///< Above the legend.
+  std::vector<std::pair<double, std::string>> names = {};  ///< Of the kinds, in the legend's order; none for a scale.
+  int itemType = 0, unit = 0;                              ///< Of a scale, which is shown in the user's unit.
+
+  bool operator==(const ValueScale&) const = default;
+};
+
 /// A grid on a map.
 struct GridLayer {
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid;
-  bool isCodes = false;  ///< Whole-number codes: one colour each, the classes of the legend are the codes.
-  std::optional<float> highlighted = {};  ///< Two colours: cells of this value, and the others.
+  bool isCodes = false;        ///< Whole-number codes: one colour each, the classes of the legend are the codes.
+  Highlight highlighted = {};  ///< With a code two colours: cells of this value, and the others.
   bool withLegend = true;
   double transparency = 0;  ///< 0 opaque, 1 invisible.
   /// Smallest and largest value of all grids that are shown in turn, so that a colour means the same in each.
   std::optional<std::pair<float, float>> range = {};
+  std::vector<std::pair<unsigned, std::string>> names = {};  ///< Of codes, for the legend; a code without one is told.
 
   bool operator==(const GridLayer&) const = default;
 };
@@ -33,17 +58,42 @@ struct GridLayer {
 /// Shapes over a grid.
 struct ShapeLayer {
   std::shared_ptr<const CYbShapeData> shapes;
-  std::string highlighted = {};            ///< Shapes whose value reads so stand out; empty for none.
+  Highlight highlighted = {};
   std::optional<unsigned> lineColor = {};  ///< Red, green, blue; the colour of the theme when nothing is said.
   std::optional<double> lineWidth = {};    ///< In pixels.
+  bool isFilled = false;                   ///< Polygons have a quiet colour for each value, and a legend.
+  bool withLabels = false;                 ///< Polygons bear their value where it fits.
 
   bool operator==(const ShapeLayer&) const = default;
+};
+
+/// A line of a network, or a piece of a boundary.
+struct MapLine {
+  std::string name = {};
+  std::vector<MapPoint> points;
+  std::vector<double> chainages = {};  ///< In metres, as many as points, or none: then it counts from the first point.
+  std::optional<double> value = {};    ///< For `LineLayer::painted`.
+};
+
+/// Lines over a grid. A line that stands out lies above the others.
+struct LineLayer {
+  std::shared_ptr<const std::vector<MapLine>> lines;
+  Highlight highlighted = {};
+  bool withPoints = false;                 ///< Points are marked, and their chainages told, where there is room.
+  bool withNames = true;                   ///< The same for names.
+  std::optional<ValueScale> painted = {};  ///< Lines are coloured by their value; those without one stay quiet.
+  std::optional<unsigned> lineColor = {};  ///< Red, green, blue.
+  std::optional<double> lineWidth = {};    ///< In pixels.
+
+  bool operator==(const LineLayer&) const = default;
 };
 
 /// Points with names over a grid.
 struct PointLayer {
   std::vector<MapPoint> points;
   std::vector<std::string> labels = {};  ///< As many, or none.
+  bool isNumbered = false;               ///< Markers hold their number from 1.
+  Highlight highlighted = {};
 
   bool operator==(const PointLayer&) const = default;
 };
@@ -55,23 +105,64 @@ struct MapPick {
   std::optional<float> value;               ///< Of that cell; nothing for an empty one.
   std::optional<std::size_t> shape;         ///< Of the first layer of shapes, by its place from 0.
   std::string shapeValue = {};              ///< The text of that shape's value.
+  std::optional<std::size_t> line;          ///< Of the first layer of lines.
+  double chainage = 0;                      ///< Along that line.
+  std::optional<std::size_t> point;         ///< Of the first layer of points.
+};
+
+/// What a page asks of the user on its map. As long as it is asked, the pointer is a target: a click gives a point,
+/// several clicks and a double click a line, Esc gives up.
+struct MapRequest {
+  enum class Kind { Point, Line };
+
+  Kind kind = Kind::Point;
+  std::string prompt;  ///< Shown on the map: "Click the place of the well North 3."
+  std::function<void(const std::vector<MapPoint>& points)> taken;
+  std::function<void()> givenUp = {};
+
+  bool AsksSame(const MapRequest& other) const { return kind == other.kind && prompt == other.prompt; }
 };
 
 /// What must be computed before a map or chart can show all that it is to show. Whoever shows it has that done, and
 /// then asks for the content anew; until then it lacks what is computed, and holds the rest.
 using Awaited = std::vector<std::shared_ptr<Computation>>;
 
-/// What a map shows, from the bottom up: grids, shapes, points.
+/// What a map shows, from the bottom up: grids, shapes, lines, points. Of each kind the first layer is the page's own.
 struct MapContent {
   std::vector<GridLayer> grids;
   std::vector<ShapeLayer> shapes;
+  std::vector<LineLayer> lines;
   std::vector<PointLayer> points;
   std::optional<Envelope> area;  ///< Shown at first; the envelope of all layers when nothing is said.
   std::string message;           ///< Shown in the place of a map that has nothing to show.
   std::function<void(const MapPick& pick)> picked;  ///< A click of the user; may be empty.
+  std::optional<MapRequest> request = {};
   Awaited awaited = {};
 
-  bool IsEmpty() const { return grids.empty() && shapes.empty() && points.empty(); }
+  bool IsEmpty() const { return grids.empty() && shapes.empty() && lines.empty() && points.empty(); }
+};
+
+/// Of the first layer of each kind: cells of that code, and what has that name or place.
+void LetStandOut(MapContent& map, const Highlight& highlighted);
+
+/// A surface of a section: elevations in the grid's unit.
+struct SectionSurface {
+  std::string name;  ///< Of what lies between it and the surface above.
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> bottom;
+  std::optional<unsigned> color = {};  ///< Red, green, blue; one of the program's when nothing is said.
+
+  bool operator==(const SectionSurface&) const = default;
+};
+
+/// A cut through the ground along a line of the map.
+struct SectionContent {
+  std::vector<MapPoint> line;  ///< None while the user has drawn none.
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> ground;
+  std::vector<SectionSurface> surfaces;  ///< From the top down.
+  std::string message;                   ///< Shown in the place of a section that has nothing to show.
+  Awaited awaited = {};
+
+  bool IsEmpty() const { return line.size() < 2 || !ground || surfaces.empty(); }
 };
 
 /// One curve of a chart.
@@ -79,16 +170,44 @@ struct Series {
   std::string name;
   std::string unit;
   std::vector<CYbDateTime> times;
-  std::vector<double> values;  ///< As many; NaN for a gap.
-  bool isStepped = false;      ///< The value holds over the interval that ends at its time.
+  std::vector<double> values;          ///< As many; NaN for a gap.
+  bool isStepped = false;              ///< The value holds over the interval that ends at its time.
+  std::vector<double> positions = {};  ///< In the place of times, for a chart over numbers (`SeriesContent::numbers`).
+  int panel = 0;                       ///< Which of several charts below each other, from 0.
 };
 
+/// A date that is marked in a chart.
+struct DateMarker {
+  std::string name;
+  CYbDateTime time;
+  std::function<void(const CYbDateTime& time)> moved = {};  ///< The user has dragged it; empty where he may not.
+};
+
+/// A date that a page asks of the user on its chart: a click gives it, Esc gives up.
+struct DateRequest {
+  std::string prompt;  ///< "Click the begin of the growing season."
+  std::function<void(const CYbDateTime& time)> taken;
+  std::function<void()> givenUp = {};
+};
+
+/// The horizontal axis of curves over a number, such as those of retention.
+struct NumberAxis {
+  std::string title, unit;
+  bool isLogarithmic = false;  ///< Positions that are not above 0 are left out.
+
+  bool operator==(const NumberAxis&) const = default;
+};
+
+/// In each chart the first two units have an axis of their own, the second one on the right.
 struct SeriesContent {
   std::vector<Series> series;
   /// Shaded: the time that is simulated.
   std::optional<std::pair<CYbDateTime, CYbDateTime>> period;
   std::string message;  ///< Shown in the place of a chart that has nothing to show.
   Awaited awaited = {};
+  std::optional<NumberAxis> numbers = {};  ///< The chart is over these, not over time.
+  std::vector<DateMarker> markers = {};
+  std::optional<DateRequest> request = {};
 
   bool IsEmpty() const { return series.empty(); }
 };
@@ -118,9 +237,12 @@ Content Finished(const std::function<Content()>& content) {
 /// a click does is not asked.
 bool LooksSame(const MapContent& a, const MapContent& b);
 bool LooksSame(const SeriesContent& a, const SeriesContent& b);
+bool LooksSame(const SectionContent& a, const SectionContent& b);
 
-/// In short what is shown, for texts: "grid 142x97, 29 shapes", "2 series, 1461 values", or the message.
+/// In short what is shown, for texts: "grid 142x97, 29 shapes", "2 series, 1461 values", or the message; and what
+/// stands out and is asked for.
 std::string Summary(const MapContent& content);
 std::string Summary(const SeriesContent& content);
+std::string Summary(const SectionContent& content);
 
 }  // namespace tervane

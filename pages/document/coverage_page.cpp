@@ -3,7 +3,6 @@
 #include "pages/document/coverage_page.h"
 
 #include <algorithm>
-#include <limits>
 
 #include <fmt/format.h>
 
@@ -159,8 +158,7 @@ MapContent CCoverageDlg::Map() {
   if (!map.grids.empty()) {
     map.grids.front().isCodes = true;
     map.grids.front().withLegend = false;
-    map.grids.front().highlighted = isMissing ? 2.0F : std::numeric_limits<float>::quiet_NaN();
-    if (!isMissing) map.grids.front().highlighted.reset();
+    if (isMissing) LetStandOut(map, {.code = 2.0F});
   }
   if (extent_) map.shapes.push_back({extent_, {}});
   return map;

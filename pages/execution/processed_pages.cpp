@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <iterator>
 #include <tuple>
 
 #include <fmt/format.h>
@@ -21,6 +22,17 @@ namespace tervane {
 namespace {
 
 constexpr const char* kNoFile = "The report names no file here.";
+constexpr int kElevation = 100180;
+
+/// The page of the ground's elevation in the report that holds a page; null when it has none.
+const CPreprocessedDataEntity* ReportedTopography(const CYbSEKvfBase& page) {
+  for (const CYbSEKvfBase* above = page.GetParent(); above; above = above->GetParent())
+    for (const CYbSEKvfBase* child = above->GetFirstChild(); child; child = above->GetNextChild(child))
+      if (const auto* grid = dynamic_cast<const CPreprocessedNDS2_PLOTkvf*>(child);
+          grid && grid->GetTitle() == "Topography")
+        return grid;
+  return nullptr;
+}
 
 /// Up to six numbers separated by commas: year, month, day, hour, minute, second. What is missing or empty is 0.
 CYbDateTime ParseListedDate(std::string_view text) {
@@ -161,12 +173,17 @@ void CPreprocessedNDS3_PLOTDlg::Describe(PageForm& form) {
       .Hint(kViewOnly);
   form.Button("Edit...", [this] { EditDataFile(Context(), Node(), FileName(Node().GetFile(), {}), Item()); })
       .ToolTip("Use grid editor to view preprocessed grid data");
+  const auto areLayers = [this] { return areElevations_ && layers_ > 0; };
+  section_.DescribeButtons(form, areLayers);
   form.Map([this] { return Map(); });
+  section_.DescribeSection(
+      form, [this] { return Section(); }, areLayers);
 }
 
 void CPreprocessedNDS3_PLOTDlg::SetData() {
   if (isRead_) return;
   isRead_ = true;
+  areElevations_ = false;
   layers_ = 0;
   DataFile file;
   const std::string path = Node().GetFile();
@@ -177,8 +194,10 @@ void CPreprocessedNDS3_PLOTDlg::SetData() {
       problem_ = fmt::format("{}: there is no item {}: the file has {}", path, number, count);
     else if (const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)]; item.dimensions != 3)
       problem_ = fmt::format("{}: item {} has no layers", path, number);
-    else
+    else {
       layers_ = item.geometry.nz;
+      areElevations_ = item.itemType == kElevation;
+    }
   }
   if (HasFixedLayer()) selection_ = Node().GetNumber("LayerNo") - 1;
   selection_ = std::clamp(selection_, 0, std::max(layers_ - 1, 0));
@@ -192,7 +211,28 @@ void CPreprocessedNDS3_PLOTDlg::OnRefresh() {
 MapContent CPreprocessedNDS3_PLOTDlg::Map() const {
   if (layers_ == 0) return GridMap(Node(), nullptr, problem_);
   // The file counts its layers from the bottom.
-  return GridFileMap(Node(), Node().GetFile(), Item(), {0, layers_ - selection_ - 1});
+  MapContent map = GridFileMap(Node(), Node().GetFile(), Item(), {0, layers_ - selection_ - 1});
+  section_.PutOn(map);
+  return map;
+}
+
+SectionContent CPreprocessedNDS3_PLOTDlg::Section() const {
+  SectionContent section;
+  const CPreprocessedDataEntity* topography = ReportedTopography(Node());
+  if (!topography) {
+    section.message = "The report has no page of the topography, below which layers could be shown.";
+    return section;
+  }
+  const auto take = [&section](MapContent map) {
+    std::ranges::move(map.awaited, std::back_inserter(section.awaited));
+    if (map.grids.empty() && !map.message.empty()) section.message = map.message;
+    return map.grids.empty() ? nullptr : map.grids.front().grid;
+  };
+  section.ground = take(GridFileMap(*topography, topography->GetFile(), topography->GetNumber("ItemNo")));
+  for (int layer = 1; layer <= layers_; ++layer)
+    if (auto bottom = take(GridFileMap(Node(), Node().GetFile(), Item(), {0, layers_ - layer})))
+      section.surfaces.push_back({fmt::format("Computational Layer {}", layer), std::move(bottom)});
+  return section;
 }
 
 // ---- Texts and shapes

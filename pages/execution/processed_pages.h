@@ -14,6 +14,7 @@
 #include "execution/processed_river.h"
 #include "forms/page_rows.h"
 #include "forms/plots.h"
+#include "pages/parts/section_tool.h"
 
 namespace tervane {
 
@@ -105,10 +106,12 @@ class CPreprocessedNDS2_PLOT : public PreprocessedFilePage {
   std::optional<CProcDataRiverPointOverlay> points_;
 };
 
-/// One of several layers of grids, counted from the top.
+/// One of several layers of grids, counted from the top. Elevations are bottoms of layers, which a section shows below
+/// the topography of the report.
 class CPreprocessedNDS3_PLOTDlg : public PreprocessedFilePage {
  public:
-  using PreprocessedFilePage::PreprocessedFilePage;
+  CPreprocessedNDS3_PLOTDlg(CYbSEKvfBase& node, PageContext context)
+      : PreprocessedFilePage(node, std::move(context)), section_(Context().syncSoon) {}
 
   void SetData() override;
   /// Looks at the file's layers again.
@@ -120,8 +123,11 @@ class CPreprocessedNDS3_PLOTDlg : public PreprocessedFilePage {
  private:
   bool HasFixedLayer() const { return !Node().GetValue("LayerNo").empty(); }
   MapContent Map() const;
+  SectionContent Section() const;
 
+  SectionTool section_;
   bool isRead_ = false;
+  bool areElevations_ = false;
   int layers_ = 0;
   int selection_ = 0;  ///< 0 for the top.
   std::string problem_;

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <iterator>
 
+#include "forms/map_question.h"
 #include "geometry/cart.h"
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/plot_content.h"
@@ -20,7 +21,8 @@ namespace {
 /// The model domain and its grid.
 class CCatchmentDlg : public PageOf<CCatchmentKvf> {
  public:
-  using PageOf::PageOf;
+  CCatchmentDlg(CYbSEKvfBase& node, PageContext context)
+      : PageOf(node, std::move(context)), question_(Context().syncSoon) {}
 
  protected:
   void Describe(PageForm& form) override;
@@ -30,6 +32,9 @@ class CCatchmentDlg : public PageOf<CCatchmentKvf> {
   Control& GridNumber(PageForm& form, const std::string& label, double& own, double GridGeometry::*inFile);
   bool BrowseShape(Host& host, const Host::FileQuestion& question);
   MapContent Map();
+  MapContent DomainMap();
+
+  MapQuestion question_;
 };
 
 Control& CCatchmentDlg::GridNumber(PageForm& form, const std::string& label, double& own,
@@ -104,6 +109,17 @@ void CCatchmentDlg::Describe(PageForm& form) {
   GridNumber(grid, "Cell Size:", n.sizeShp, &GridGeometry::cellSize);
   GridNumber(grid, "X0:", n.x0Shp, &GridGeometry::x0);
   GridNumber(grid, "Y0:", n.y0Shp, &GridGeometry::y0);
+  grid.Button("Pick Corner on Map",
+              [this] {
+                question_.AskPoint("Click the lower left corner of the grid. Esc gives up.", [this](MapPoint corner) {
+                  Node().x0Shp = corner.x;
+                  Node().y0Shp = corner.y;
+                  Node().SetRevalidateAll();
+                  UpdateDoc(kDataChanged, "Pick Corner of the Grid");
+                });
+              })
+      .ToolTip("Takes X0 and Y0 from a click on the map")
+      .EnabledWhen(fromShape);
   GridNumber(grid, "Rotation:", n.rotationShp, &GridGeometry::rotation);
   grid.Text(
           "Map Projection Type:", [&n] { return n.GetModelGeometry().projection; },
@@ -117,6 +133,12 @@ void CCatchmentDlg::Describe(PageForm& form) {
 }
 
 MapContent CCatchmentDlg::Map() {
+  MapContent map = DomainMap();
+  question_.PutOn(map);
+  return map;
+}
+
+MapContent CCatchmentDlg::DomainMap() {
   CCatchmentKvf& n = Node();
   if (n.Type == CCatchmentKvf::kGridFile) {
     MapContent map = FileMap(n.GridFile());

@@ -53,14 +53,14 @@ void DescribeValueOrSeries(PageForm& form, CYbSEDlgBase& page, ValueOrSeries dat
 MapContent StationMap(const C2DStationBasedDataKvf& data, const CFMSEKvfGroupBase* highlighted) {
   if (data.UsesPolygons()) {
     MapContent map = ShapeFileMap(data.Stations().ShapeFile(), data.Stations().ShapeAxisUnit);
-    if (highlighted && !map.shapes.empty()) map.shapes.front().highlighted = highlighted->GetStationId();
+    if (highlighted) LetStandOut(map, {.name = highlighted->GetStationId()});
     return map;
   }
   const bool isDistributed = data.DistributionType == C2DStationBasedDataKvf::kFullyDistributed;
   MapContent map = isDistributed ? FileMap(data.FullyDistributed().GridFile()) : FileMap(data.Stations().GridFile());
   if (!map.grids.empty() && !isDistributed) {
     map.grids.front().isCodes = true;
-    if (highlighted) map.grids.front().highlighted = static_cast<float>(highlighted->StationCode());
+    if (highlighted) LetStandOut(map, {.code = static_cast<float>(highlighted->StationCode())});
   }
   return map;
 }

@@ -18,14 +18,12 @@ namespace {
 MapContent ZoneMap(const CodedZonesKvf& zones, const CFMSEKvfGroupBase* highlighted) {
   if (zones.UsesPolygons()) {
     MapContent map = ShapeFileMap(zones.ShapeFile(), zones.ShapeAxisUnit);
-    if (highlighted && !map.shapes.empty()) map.shapes.front().highlighted = highlighted->GetStationId();
+    if (highlighted) LetStandOut(map, {.name = highlighted->GetStationId()});
     return map;
   }
   MapContent map = FileMap(zones.GridFile());
-  if (!map.grids.empty()) {
-    map.grids.front().isCodes = true;
-    if (highlighted) map.grids.front().highlighted = static_cast<float>(highlighted->StationCode());
-  }
+  if (!map.grids.empty()) map.grids.front().isCodes = true;
+  if (highlighted) LetStandOut(map, {.code = static_cast<float>(highlighted->StationCode())});
   return map;
 }
 

@@ -2,13 +2,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <QApplication>
 #include <QFutureWatcher>
-#include <QMouseEvent>
 #include <QPainter>
 #include <QPainterPath>
 #include <QPromise>
 #include <QThreadPool>
 #include <algorithm>
-#include <array>
 #include <cmath>
 
 #include "shell/maps/map_canvas_parts.h"
@@ -21,15 +19,27 @@ namespace {
 
 constexpr std::size_t kCellsAtOnce = 400'000;  ///< Made ready before the map is shown: a few milliseconds.
 constexpr int kMargin = 8;
-constexpr double kClickRadius = 4;  ///< In pixels at zoom 1, as all of these.
-constexpr double kReach = 6;        ///< How near a line or point must be to be pointed at.
-constexpr double kZoomStep = 1.5;
+constexpr double kReach = 6;  ///< How near a line or point must be to be pointed at, in pixels at zoom 1.
+constexpr int kChainageType = 100143;
 
 using Made = std::shared_ptr<const GridPicture>;
 
+/// The nearest point whose marker is at the place.
+std::optional<std::size_t> PointAt(const PointLayer& layer, MapPoint place, double metresPerPixel) {
+  std::optional<std::size_t> found;
+  double nearest = std::max(Scaled(kReach), MarkerReach(layer, Theme::Get().Zoom())) * metresPerPixel;
+  for (std::size_t i = 0; i < layer.points.size(); ++i) {
+    const double distance = std::hypot(layer.points[i].x - place.x, layer.points[i].y - place.y);
+    if (distance >= nearest) continue;
+    nearest = distance;
+    found = i;
+  }
+  return found;
+}
+
 }  // namespace
 
-MapCanvas::MapCanvas(QWidget* parent) : QWidget(parent) {
+MapCanvas::MapCanvas(QWidget* parent) : QWidget(parent), vectors_(std::make_unique<VectorScene>()) {
   setMouseTracking(true);
   setFocusPolicy(Qt::StrongFocus);
   setMinimumSize(Theme::Get().Scaled(160), Theme::Get().Scaled(120));
@@ -55,8 +65,8 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
     const auto same = std::ranges::find_if(old, [&](const auto& layer) {
       // How transparent a layer is, or whether it has a legend, does not change its colours.
       return layer && layer->grid.grid == grid.grid && layer->grid.isCodes == grid.isCodes &&
-             layer->grid.highlighted == grid.highlighted && layer->grid.range == grid.range &&
-             layer->unitKey == unitKey;
+             layer->grid.highlighted.code == grid.highlighted.code && layer->grid.range == grid.range &&
+             layer->grid.names == grid.names && layer->unitKey == unitKey;
     });
     if (same != old.end()) {
       layers_.push_back(std::move(*same));
@@ -70,6 +80,8 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
   }
   shapes_.clear();
   for (const ShapeLayer& layer : content_.shapes) shapes_.emplace_back(layer);
+  lines_.clear();
+  for (const LineLayer& layer : content_.lines) lines_.emplace_back(layer, units_);
   if (wasEmpty || WholeArea() != before) isFitted_ = true;
   Arrange();
 }
@@ -98,6 +110,7 @@ bool MapCanvas::IsPreparing() const {
 }
 
 void MapCanvas::WaitUntilReady() {
+  if (!IsPreparing()) return;
   for (const auto& layer : layers_) {
     if (layer->picture) continue;
     layer->watcher.waitForFinished();
@@ -109,17 +122,11 @@ void MapCanvas::WaitUntilReady() {
 std::optional<Envelope> MapCanvas::WholeArea() const {
   if (content_.area) return content_.area;
   std::optional<Envelope> all;
-  const auto add = [&all](const Envelope& area) {
-    all = all ? Envelope{std::min(all->xMin, area.xMin), std::min(all->yMin, area.yMin), std::max(all->xMax, area.xMax),
-                         std::max(all->yMax, area.yMax)}
-              : area;
-  };
   for (const GridLayer& layer : content_.grids)
-    if (layer.grid->Geometry().CellCount() > 0) add(layer.grid->GetEnvelope());
-  for (const ShapePicture& layer : shapes_)
-    if (layer.Area()) add(*layer.Area());
-  for (const PointLayer& layer : content_.points)
-    for (const MapPoint& point : layer.points) add({point.x, point.y, point.x, point.y});
+    if (layer.grid->Geometry().CellCount() > 0) Extend(all, layer.grid->GetEnvelope());
+  for (const ShapePicture& layer : shapes_) Extend(all, layer.Area());
+  for (const LinePicture& layer : lines_) Extend(all, layer.Area());
+  for (const PointLayer& layer : content_.points) Extend(all, EnvelopeAround(layer.points));
   return all;
 }
 
@@ -143,6 +150,7 @@ void MapCanvas::Arrange() {
     map.setRight(legendPlace_.left() - Scaled(kLegendPadding));
   }
   window_.rect = map.toAlignedRect();
+  vectors_->picture = {};
   if (isFitted_)
     Fit();
   else
@@ -196,6 +204,13 @@ MapPick MapCanvas::PickAt(MapPoint place) const {
     }
   }
   if (!shapes_.empty()) pick.shape = shapes_.front().At(place, Reach());
+  if (!lines_.empty()) {
+    if (const auto at = lines_.front().At(place, Reach())) {
+      pick.line = at->line;
+      pick.chainage = at->chainage;
+    }
+  }
+  if (!content_.points.empty()) pick.point = PointAt(content_.points.front(), place, window_.metresPerPixel);
   if (pick.shape) {
     const Shape& shape = content_.shapes.front().shapes->GetData()[*pick.shape];
     if (shape.HasValue()) pick.shapeValue = TextOf(shape.Value());
@@ -224,6 +239,18 @@ QString MapCanvas::TextAt(MapPoint place) const {
     text += "   " + (value.isEmpty() ? tr("shape %1").arg(*pick.shape + 1)
                                      : tr("shape %1: %2").arg(*pick.shape + 1).arg(value));
   }
+  if (pick.line) {
+    const LineLayer& layer = content_.lines.front();
+    const MapLine& line = (*layer.lines)[*pick.line];
+    text += "   " + (line.name.empty() ? tr("line %1").arg(*pick.line + 1) : ToQt(line.name));
+    text += ", " + tr("chainage %1").arg(ShownUnit(kChainageType, 1000, &units_).Value(std::round(pick.chainage)));
+    if (layer.painted && line.value) text += "   " + lines_.front().Colors().TextOf(*line.value);
+  }
+  if (pick.point) {
+    const PointLayer& layer = content_.points.front();
+    text += "   " + tr("point %1").arg(*pick.point + 1);
+    if (layer.labels.size() == layer.points.size()) text += ": " + ToQt(layer.labels[*pick.point]);
+  }
   return text;
 }
 
@@ -245,7 +272,7 @@ QImage MapCanvas::Picture(double pixelRatio) {
   picture.setDevicePixelRatio(pixelRatio);
   QPainter painter(&picture);
   painter.setFont(font());
-  Render(painter, pixelRatio);
+  Render(painter, pixelRatio, false);
   return picture;
 }
 
@@ -255,10 +282,11 @@ void MapCanvas::paintEvent(QPaintEvent* /*event*/) {
     scene_.setDevicePixelRatio(devicePixelRatioF());
     QPainter painter(&scene_);
     painter.setFont(font());
-    Render(painter, devicePixelRatioF());
+    Render(painter, devicePixelRatioF(), true);
   }
   QPainter painter(this);
   painter.drawPixmap(0, 0, scene_);
+  if (request_ && !content_.IsEmpty()) DrawRequest(painter);
   if (gesture_ != Gesture::Box) return;
   QColor veil = palette().color(QPalette::Highlight);
   painter.setPen(QPen(veil, 1.5));
@@ -267,9 +295,13 @@ void MapCanvas::paintEvent(QPaintEvent* /*event*/) {
   painter.drawRect(QRectF(pressedAt_, draggedTo_).normalized());
 }
 
-void MapCanvas::Render(QPainter& painter, double pixelRatio) {
-  const bool isDark = Theme::Get().IsDark();
-  const double zoom = Theme::Get().Zoom();
+DrawnMap MapCanvas::Drawn() const {
+  // On a small map lines and points are finer too.
+  const double small = std::clamp(std::min(window_.rect.width(), window_.rect.height()) / Scaled(400), 0.6, 1.0);
+  return {window_, window_.rect, Theme::Get().IsDark(), Theme::Get().Zoom() * small};
+}
+
+void MapCanvas::Render(QPainter& painter, double pixelRatio, bool isScreen) {
   painter.setRenderHint(QPainter::Antialiasing);
   painter.fillRect(rect(), palette().color(QPalette::Base));
   if (content_.IsEmpty()) {
@@ -284,120 +316,87 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio) {
   painter.setClipRect(window_.rect);
   for (const auto& layer : layers_)
     if (layer->picture) layer->picture->Draw(painter, window_, pixelRatio, 1 - layer->grid.transparency);
-  // On a small map lines and points are finer too.
-  const double small = std::clamp(std::min(window_.rect.width(), window_.rect.height()) / Scaled(400), 0.6, 1.0);
-  for (const ShapePicture& shapes : shapes_) shapes.Draw(painter, window_, isDark, zoom * small);
-  const ScaleBar scale = MakeScaleBar();
-  std::vector<QRectF> taken{NorthArrowPlace(), scale.box};
-  for (const PointLayer& points : content_.points)
-    DrawLabelledPoints(painter, window_, points, isDark, zoom * small, taken);
-  DrawNorthArrow(painter);
-  DrawScaleBar(painter, scale);
-  if (IsPreparing()) {
-    const QString text = tr("Drawing...");
-    QRectF chip = QFontMetricsF(font()).boundingRect(text);
-    chip.adjust(-Scaled(14), -Scaled(8), Scaled(14), Scaled(8));
-    chip.moveCenter(window_.rect.center());
-    painter.setPen(palette().color(QPalette::Mid));
-    painter.setBrush(palette().color(QPalette::Window));
-    painter.drawRoundedRect(chip, Scaled(6), Scaled(6));
-    painter.setPen(palette().color(QPalette::WindowText));
-    painter.drawText(chip, Qt::AlignCenter, text);
-  }
+  DrawVectors(painter, pixelRatio, isScreen);
+  DrawMarkers(painter);
+  if (IsPreparing()) DrawPreparing(painter);
   painter.restore();
   DrawFrame(painter);
   DrawLegends(painter);
 }
 
-// ---- Mouse and keyboard
-
-void MapCanvas::resizeEvent(QResizeEvent* /*event*/) { Arrange(); }
-
-void MapCanvas::changeEvent(QEvent* event) {
-  if (event->type() == QEvent::FontChange || event->type() == QEvent::PaletteChange) Arrange();
-  QWidget::changeEvent(event);
+void MapCanvas::DrawVectorPart(QPainter& painter, const DrawnMap& map) const {
+  painter.setRenderHint(QPainter::Antialiasing);
+  for (const ShapePicture& shapes : shapes_)
+    if (!shapes.ArePoints()) shapes.Draw(painter, map);
+  for (const LinePicture& lines : lines_) lines.Draw(painter, map);
 }
 
-void MapCanvas::mousePressEvent(QMouseEvent* event) {
-  if (event->button() != Qt::LeftButton || content_.IsEmpty()) return QWidget::mousePressEvent(event);
-  setFocus(Qt::MouseFocusReason);
-  pressedAt_ = draggedTo_ = event->position();
-  isSecondClick_ = false;
-  gesture_ = event->modifiers() & Qt::ShiftModifier ? Gesture::Box : Gesture::Press;
-}
-
-void MapCanvas::mouseMoveEvent(QMouseEvent* event) {
-  const QPointF at = event->position();
-  if (gesture_ == Gesture::Press && (at - pressedAt_).manhattanLength() > kClickRadius) {
-    gesture_ = Gesture::Pan;
-    setCursor(Qt::ClosedHandCursor);
-  }
-  if (gesture_ == Gesture::Pan) Pan(at - draggedTo_);
-  if (gesture_ == Gesture::Box) update();
-  draggedTo_ = at;
-  const bool isOnMap = !content_.IsEmpty() && window_.rect.contains(at);
-  emit PointedAt(isOnMap ? TextAt(window_.ToMap(at)) : QString());
-}
-
-void MapCanvas::mouseReleaseEvent(QMouseEvent* event) {
-  if (event->button() != Qt::LeftButton) return QWidget::mouseReleaseEvent(event);
-  const Gesture gesture = std::exchange(gesture_, Gesture::None);
-  setCursor(Qt::CrossCursor);
-  const QPointF at = event->position();
-  if (gesture == Gesture::Box) {
-    const QRectF box = QRectF(pressedAt_, at).normalized();
-    if (box.width() > kClickRadius && box.height() > kClickRadius) {
-      const MapPoint centre = window_.ToMap(box.center());
-      Zoom(std::min(window_.rect.width() / box.width(), window_.rect.height() / box.height()));
-      window_.centre = centre;
+void MapCanvas::DrawVectors(QPainter& painter, double pixelRatio, bool isScreen) {
+  if (shapes_.empty() && lines_.empty()) return;
+  DrawnMap map = Drawn();
+  if (!isScreen) return DrawVectorPart(painter, map);
+  VectorScene& scene = *vectors_;
+  const QSize pixels = (QSizeF(size()) * pixelRatio).toSize();
+  const bool isAlike = scene.picture.size() == pixels && scene.window.rect == window_.rect &&
+                       scene.window.metresPerPixel == window_.metresPerPixel;
+  QRegion missing(QRect({}, pixels));
+  if (isAlike) {
+    const QPointF by = (window_.ToScreen(scene.window.centre) - window_.rect.center()) * pixelRatio;
+    const QPoint whole = by.toPoint();
+    constexpr double kUnseen = 0.02;  // of a pixel
+    if ((by - whole).manhattanLength() < kUnseen && std::abs(whole.x()) < pixels.width() &&
+        std::abs(whole.y()) < pixels.height()) {
+      missing = {};
+      if (!whole.isNull()) scene.picture.scroll(whole.x(), whole.y(), scene.picture.rect(), &missing);
+      scene.window.centre.x -= whole.x() / pixelRatio * window_.metresPerPixel;
+      scene.window.centre.y += whole.y() / pixelRatio * window_.metresPerPixel;
+    } else {
+      scene.window = window_;
     }
-    Redraw();
-  } else if (gesture == Gesture::Press && !isSecondClick_ && window_.rect.contains(at)) {
-    // The page may be replaced by what the click does.
-    const auto picked = content_.picked;
-    if (picked) picked(PickAt(window_.ToMap(at)));
+  } else {
+    scene.picture = QPixmap(pixels);
+    // Without this a picture has no transparency.
+    scene.picture.fill(Qt::transparent);
+    scene.picture.setDevicePixelRatio(pixelRatio);
+    scene.window = window_;
   }
-}
-
-void MapCanvas::mouseDoubleClickEvent(QMouseEvent* event) {
-  if (event->button() != Qt::LeftButton) return;
-  isSecondClick_ = true;
-  Fit();
-}
-
-void MapCanvas::wheelEvent(QWheelEvent* event) {
-  const int turned = event->angleDelta().y();
-  if (content_.IsEmpty() || turned == 0) return event->ignore();
-  Zoom(std::pow(kZoomStep, turned / 120.0), event->position());
-  event->accept();
-}
-
-void MapCanvas::keyPressEvent(QKeyEvent* event) {
-  const double step = 0.15 * std::min(window_.rect.width(), window_.rect.height());
-  switch (event->key()) {
-    case Qt::Key_Plus:
-    case Qt::Key_Equal:
-      return Zoom(kZoomStep);
-    case Qt::Key_Minus:
-      return Zoom(1 / kZoomStep);
-    case Qt::Key_Left:
-      return Pan({step, 0});
-    case Qt::Key_Right:
-      return Pan({-step, 0});
-    case Qt::Key_Up:
-      return Pan({0, step});
-    case Qt::Key_Down:
-      return Pan({0, -step});
-    case Qt::Key_Home:
-      return Fit();
-    case Qt::Key_Escape:
-      gesture_ = Gesture::None;
-      return update();
-    default:
-      QWidget::keyPressEvent(event);
+  map.window = scene.window;
+  QPainter inner(&scene.picture);
+  for (const QRect& part : missing) {
+    const QRectF place(QPointF(part.topLeft()) / pixelRatio, QSizeF(part.size()) / pixelRatio);
+    // Also what the frame hides now: it comes into view when the map is moved.
+    map.part = place;
+    inner.setClipRect(place);
+    inner.setCompositionMode(QPainter::CompositionMode_Source);
+    inner.fillRect(place, Qt::transparent);
+    inner.setCompositionMode(QPainter::CompositionMode_SourceOver);
+    DrawVectorPart(inner, map);
   }
+  inner.end();
+  painter.drawPixmap(0, 0, scene.picture);
 }
 
-void MapCanvas::leaveEvent(QEvent* /*event*/) { emit PointedAt({}); }
+void MapCanvas::DrawMarkers(QPainter& painter) {
+  const DrawnMap map = Drawn();
+  for (const ShapePicture& shapes : shapes_)
+    if (shapes.ArePoints()) shapes.Draw(painter, map);
+  const ScaleBar scale = MakeScaleBar();
+  LabelPlaces places(window_.rect);
+  places.Take(NorthArrowPlace());
+  places.Take(scale.box);
+  for (const PointLayer& points : content_.points) DrawLabelledPoints(painter, points, map, places);
+  for (const LinePicture& lines : lines_) lines.DrawLabels(painter, map, places);
+  for (const ShapePicture& shapes : shapes_) shapes.DrawLabels(painter, map, places);
+  DrawNorthArrow(painter);
+  DrawScaleBar(painter, scale);
+}
+
+void MapCanvas::DrawPreparing(QPainter& painter) {
+  const QString text = tr("Drawing...");
+  QRectF chip = QFontMetricsF(font()).boundingRect(text);
+  chip.adjust(-Scaled(14), -Scaled(8), Scaled(14), Scaled(8));
+  chip.moveCenter(window_.rect.center());
+  DrawChip(painter, chip, text, palette());
+}
 
 }  // namespace tervane

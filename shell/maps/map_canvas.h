@@ -10,7 +10,9 @@
 #include <vector>
 
 #include "forms/plots.h"
+#include "shell/maps/map_lines.h"
 #include "shell/maps/map_rendering.h"
+#include "shell/maps/map_shapes.h"
 
 namespace tervane {
 
@@ -27,6 +29,9 @@ class MapCanvas : public QWidget {
   void SetContent(MapContent content, const DisplayUnits* units);
   const MapContent& Content() const { return content_; }
   void SetPicked(std::function<void(const MapPick&)> picked) { content_.picked = std::move(picked); }
+  /// Asks the user for a point or a line, or no longer; the same question asked again leaves what he has drawn.
+  void Ask(std::optional<MapRequest> request);
+  bool IsAsking() const { return request_.has_value(); }
 
   /// The part of the map that is seen, in the canvas's own coordinates.
   const MapWindow& Window() const { return window_; }
@@ -70,9 +75,27 @@ class MapCanvas : public QWidget {
   std::optional<Envelope> WholeArea() const;
   void Arrange();
   void Redraw();
-  void Render(QPainter& painter, double pixelRatio);
+  void Render(QPainter& painter, double pixelRatio, bool isScreen);
+  /// How layers are drawn now.
+  DrawnMap Drawn() const;
+  /// Shapes and lines. On the screen what was drawn is moved along with the map, and only its borders are drawn anew.
+  void DrawVectors(QPainter& painter, double pixelRatio, bool isScreen);
+  void DrawVectorPart(QPainter& painter, const DrawnMap& map) const;
+  void DrawMarkers(QPainter& painter);
+  void DrawPreparing(QPainter& painter);
+  /// What is asked of the user and what he has drawn so far.
+  void DrawRequest(QPainter& painter);
+  void SyncCursor();
+  void TakeClick(MapPoint clicked);
+  void EndLine();
+  void Answer();
+  void GiveUp();
+  bool PressInRequest(int key);
+  QString DrawnText(MapPoint place) const;
+  /// What the legend tells, from the top down.
+  std::vector<LegendBlock> Legends() const;
   void DrawLegends(QPainter& painter);
-  double DrawLegend(QPainter& painter, const Layer& layer, QRectF place);
+  double DrawLegend(QPainter& painter, const LegendBlock& legend, QRectF place);
   void DrawFrame(QPainter& painter);
   QRectF NorthArrowPlace() const;
   void DrawNorthArrow(QPainter& painter);
@@ -81,7 +104,6 @@ class MapCanvas : public QWidget {
   ScaleBar MakeScaleBar() const;
   void DrawScaleBar(QPainter& painter, const ScaleBar& scale);
   double LegendWidth() const;
-  QString LegendTitle(const Layer& layer) const;
   QString HiddenText(std::size_t count) const;
   MapPick PickAt(MapPoint place) const;
   double Reach() const;
@@ -90,6 +112,11 @@ class MapCanvas : public QWidget {
   DisplayUnits units_;
   std::vector<std::unique_ptr<Layer>> layers_;
   std::vector<ShapePicture> shapes_;
+  std::vector<LinePicture> lines_;
+  struct VectorScene;  ///< Shapes and lines as last drawn.
+  std::unique_ptr<VectorScene> vectors_;
+  std::optional<MapRequest> request_;
+  std::vector<MapPoint> drawn_;  ///< Points of a line that is asked for.
   MapWindow window_;
   QRectF legendPlace_;
   bool hasTicks_ = false;
@@ -97,6 +124,8 @@ class MapCanvas : public QWidget {
   QPixmap scene_;         ///< As last drawn; null when it must be drawn anew.
   Gesture gesture_ = Gesture::None;
   bool isSecondClick_ = false;
+  bool isTaken_ = false;    ///< The last click gave a point that was asked for.
+  bool isPointed_ = false;  ///< The pointer is over the map.
   QPointF pressedAt_, draggedTo_;
 };
 

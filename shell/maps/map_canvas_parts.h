@@ -5,6 +5,7 @@
 #pragma once
 
 #include <QFutureWatcher>
+#include <QPalette>
 #include <atomic>
 #include <memory>
 
@@ -31,6 +32,15 @@ struct MapCanvas::Layer {
   QFutureWatcher<std::shared_ptr<const GridPicture>> watcher;
 
   ~Layer() { *isGivenUp = true; }
+};
+
+/// A text on paper of its own over the map.
+void DrawChip(QPainter& painter, const QRectF& chip, const QString& text, const QPalette& colors);
+
+/// Shapes and lines as last drawn, over the whole canvas; without a picture nothing was drawn yet.
+struct MapCanvas::VectorScene {
+  QPixmap picture;
+  MapWindow window;
 };
 
 /// The length that the scale bar shows, with its texts and its place.

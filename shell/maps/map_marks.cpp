@@ -1,7 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// What tells a reader of the map where he is and what he sees: frame, legends, north arrow, scale bar.
+// What tells a reader of the map where he is and what he sees: frame, north arrow, scale bar.
 #include <QPainter>
 #include <QPainterPath>
 #include <algorithm>
@@ -14,12 +14,6 @@
 #include "shell/widgets/theme.h"
 
 namespace tervane {
-
-namespace {
-
-constexpr int kSwatchWidth = 20;  ///< In pixels at zoom 1.
-
-}  // namespace
 
 void MapCanvas::DrawFrame(QPainter& painter) {
   const QColor ink = Theme::Get().QuietColor();
@@ -48,7 +42,8 @@ void MapCanvas::DrawFrame(QPainter& painter) {
       const double y = window_.ToScreen({0, unit.Stored(i * step)}).y(), x = window_.rect.left();
       const QString text = NumberInSteps(i * step, step);
       const double half = metrics.horizontalAdvance(text) / 2;
-      if (y - half < 0 || y + half > height()) continue;
+      // Below the frame it would meet the first label of the other axis.
+      if (y - half < 0 || y + half > window_.rect.bottom() + tick) continue;
       painter.drawLine(QPointF(x, y), QPointF(x - tick, y));
       painter.save();
       painter.translate(x - tick - metrics.descent(), y + half);
@@ -142,100 +137,12 @@ void MapCanvas::DrawScaleBar(QPainter& painter, const ScaleBar& scale) {
   painter.drawText(QPointF(start.x() + scale.pixels - digit, baseline), scale.text);
 }
 
-// ---- Legend
-
-QString MapCanvas::LegendTitle(const Layer& layer) const {
-  const CTvn2DOrthoRotatedGridData& grid = *layer.grid.grid;
-  QString title = ToQt(grid.ItemName());
-  const ItemType* item = FindItemType(grid.ItemType());
-  if (title.isEmpty() && item && item->code != quantity::kUndefined) title = Translated(std::string(item->name));
-  const std::string unit = ShownUnit(grid.ItemType(), grid.ItemUnit(), &units_).Text();
-  if (!unit.empty() && !layer.grid.isCodes) title += (title.isEmpty() ? "[" : " [") + ToQt(unit) + "]";
-  return title;
-}
-
-QString MapCanvas::HiddenText(std::size_t count) const { return tr("and %n more", nullptr, static_cast<int>(count)); }
-
-double MapCanvas::LegendWidth() const {
-  const QFontMetricsF metrics(font());
-  double width = 0;
-  for (const auto& layer : layers_) {
-    if (!layer->picture || !layer->grid.withLegend) continue;
-    const MapPalette& colors = layer->picture->Palette();
-    for (const MapPalette::Row& row : colors.Legend())
-      width = std::max(width, Scaled(kSwatchWidth + 8) + metrics.horizontalAdvance(row.text));
-    width = std::max(width, metrics.horizontalAdvance(HiddenText(10000)) * (colors.HiddenCodes() > 0));
-    // A long title breaks into lines, so that it does not take the map's place.
-    QFont bold = font();
-    bold.setBold(true);
-    const QFontMetricsF boldMetrics(bold);
-    for (const QString& word : LegendTitle(*layer).split(' '))
-      width = std::max(width, boldMetrics.horizontalAdvance(word));
-  }
-  return width > 0 ? std::ceil(std::max(width, Scaled(90))) + 2 : 0;
-}
-
-void MapCanvas::DrawLegends(QPainter& painter) {
-  if (legendPlace_.isEmpty()) return;
-  QRectF place = legendPlace_;
-  // What stands on top is told first.
-  for (auto layer = layers_.rbegin(); layer != layers_.rend(); ++layer) {
-    if (!(*layer)->picture || !(*layer)->grid.withLegend) continue;
-    place.setTop(place.top() + DrawLegend(painter, **layer, place) + Scaled(12));
-  }
-}
-
-double MapCanvas::DrawLegend(QPainter& painter, const Layer& layer, QRectF place) {
-  const MapPalette& colors = layer.picture->Palette();
-  const QColor ink = palette().color(QPalette::Text);
-  QFont bold = painter.font();
-  const QFont plain = painter.font();
-  bold.setBold(true);
-  painter.setFont(bold);
-  painter.setPen(ink);
-  QRectF title;
-  painter.drawText(place, Qt::AlignLeft | Qt::AlignTop | Qt::TextWordWrap, LegendTitle(layer), &title);
-  painter.setFont(plain);
-  double y = title.isEmpty() ? place.top() : title.bottom() + Scaled(5);
-
-  const QFontMetricsF metrics(plain);
-  std::size_t count = colors.Legend().size(), hidden = colors.HiddenCodes();
-  const double room = place.bottom() - y, usual = metrics.height() + Scaled(colors.IsScale() ? 3 : 4);
-  double rowHeight = usual;
-  if (colors.IsScale()) {
-    // A scale stays whole: its rows grow flat, and only every so many are labelled.
-    rowHeight = std::min(usual, std::max(room / static_cast<double>(std::max<std::size_t>(count, 1)), 3.0));
-  } else if (usual * static_cast<double>(count + (hidden > 0)) > room) {
-    const auto fits = static_cast<std::size_t>(std::max(room / usual - 1, 0.0));
-    hidden += count - std::min(count, fits);
-    count = std::min(count, fits);
-  }
-  const auto labelEvery = static_cast<std::size_t>(std::ceil(metrics.height() * 0.85 / rowHeight));
-  for (std::size_t i = 0; i < count; ++i) {
-    const MapPalette::Row& row = colors.Legend()[i];
-    const double gap = colors.IsScale() ? 0 : Scaled(4);
-    const QRectF swatch(place.left(), y + gap / 2, Scaled(kSwatchWidth), rowHeight - gap);
-    QColor color = row.color;
-    color.setAlphaF(static_cast<float>(1 - layer.grid.transparency));
-    painter.fillRect(swatch, color);
-    painter.setPen(QPen(Theme::Get().QuietColor(), 1));
-    painter.setBrush(Qt::NoBrush);
-    painter.setRenderHint(QPainter::Antialiasing, false);
-    painter.drawRect(swatch);
-    painter.setRenderHint(QPainter::Antialiasing);
-    painter.setPen(ink);
-    if (i % labelEvery == 0)
-      painter.drawText(QRectF(swatch.right() + Scaled(8), y + rowHeight / 2 - usual / 2, place.width(), usual),
-                       Qt::AlignLeft | Qt::AlignVCenter, row.text);
-    y += rowHeight;
-  }
-  if (hidden > 0) {
-    painter.setPen(Theme::Get().QuietColor());
-    painter.drawText(QRectF(place.left(), y, place.width(), usual), Qt::AlignLeft | Qt::AlignVCenter,
-                     HiddenText(hidden));
-    y += usual;
-  }
-  return y - place.top();
+void DrawChip(QPainter& painter, const QRectF& chip, const QString& text, const QPalette& colors) {
+  painter.setPen(colors.color(QPalette::Mid));
+  painter.setBrush(colors.color(QPalette::Window));
+  painter.drawRoundedRect(chip, Scaled(6), Scaled(6));
+  painter.setPen(colors.color(QPalette::WindowText));
+  painter.drawText(chip, Qt::AlignCenter | Qt::TextWordWrap, text);
 }
 
 }  // namespace tervane

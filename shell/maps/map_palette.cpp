@@ -27,24 +27,6 @@ constexpr std::array<QRgb, 20> kDistinct{0xff4e79a7, 0xfff28e2b, 0xff59a14f, 0xf
 constexpr QRgb kHighlight = 0xffe07b2a;
 constexpr QRgb kOthers = 0xffa9b6c2;
 
-QRgb RampColor(double part) {
-  const double at = std::clamp(part, 0.0, 1.0) * static_cast<double>(kRamp.size() - 1);
-  const auto low = std::min(static_cast<std::size_t>(at), kRamp.size() - 2);
-  const double weight = at - static_cast<double>(low);
-  const auto mix = [&](int a, int b) { return static_cast<int>(std::lround(a + weight * (b - a))); };
-  const QRgb a = kRamp[low], b = kRamp[low + 1];
-  return qRgb(mix(qRed(a), qRed(b)), mix(qGreen(a), qGreen(b)), mix(qBlue(a), qBlue(b)));
-}
-
-/// Beyond the distinct colours hues step by the golden angle, which never comes near an earlier one soon.
-QRgb CodeColor(std::size_t ordinal) {
-  if (ordinal < kDistinct.size()) return kDistinct[ordinal];
-  const double turn = static_cast<double>(ordinal) * 0.618033988749895;
-  const int saturation = 75 + static_cast<int>(ordinal % 3) * 40;
-  const int value = 235 - static_cast<int>(ordinal / 3 % 3) * 40;
-  return QColor::fromHsv(static_cast<int>((turn - std::floor(turn)) * 359), saturation, value).rgb();
-}
-
 /// Values of which so much lies at one end that equal classes would show nothing else.
 struct Range {
   double low = 0, high = 0;
@@ -74,26 +56,22 @@ Range RangeOf(const CTvn2DOrthoRotatedGridData& grid, double smallest, double la
 
 }  // namespace
 
-ShownUnit::ShownUnit(int itemType, int storedUnit, const DisplayUnits* units) {
-  const ItemType* item = FindItemType(itemType);
-  const Unit* stored = FindUnit(storedUnit);
-  if (!stored && item) stored = &BaseUnit(*item);
-  if (!stored) return;
-  const Unit* shown = !item ? stored : units ? &units->UnitOf(*item) : &BaseUnit(*item);
-  const auto there = ConversionBetween(stored->scale, shown->scale);
-  const auto back = ConversionBetween(shown->scale, stored->scale);
-  if (there && back) {
-    toShown_ = *there;
-    toStored_ = *back;
-    text_ = shown->abbreviation;
-  } else {
-    text_ = stored->abbreviation;
-  }
+QRgb RampColor(double part) {
+  const double at = std::clamp(part, 0.0, 1.0) * static_cast<double>(kRamp.size() - 1);
+  const auto low = std::min(static_cast<std::size_t>(at), kRamp.size() - 2);
+  const double weight = at - static_cast<double>(low);
+  const auto mix = [&](int a, int b) { return static_cast<int>(std::lround(a + weight * (b - a))); };
+  const QRgb a = kRamp[low], b = kRamp[low + 1];
+  return qRgb(mix(qRed(a), qRed(b)), mix(qGreen(a), qGreen(b)), mix(qBlue(a), qBlue(b)));
 }
 
-QString ShownUnit::Value(double stored) const {
-  const QString number = ToQt(FormatNumber(Shown(stored), "%.6g"));
-  return text_.empty() ? number : number + " " + ToQt(text_);
+// Beyond the distinct colours hues step by the golden angle, which never comes near an earlier one soon.
+QRgb CodeColor(std::size_t ordinal) {
+  if (ordinal < kDistinct.size()) return kDistinct[ordinal];
+  const double turn = static_cast<double>(ordinal) * 0.618033988749895;
+  const int saturation = 75 + static_cast<int>(ordinal % 3) * 40;
+  const int value = 235 - static_cast<int>(ordinal / 3 % 3) * 40;
+  return QColor::fromHsv(static_cast<int>((turn - std::floor(turn)) * 359), saturation, value).rgb();
 }
 
 double NiceStep(double atLeast) {
@@ -127,15 +105,97 @@ QString NumberInSteps(double value, double step) {
   return QString::number(value == 0 ? 0.0 : value, 'f', decimals);
 }
 
+// ---- Legends
+
+void LegendBlock::Add(const QColor& color, const QString& text) {
+  if (rows.size() < kMostRows)
+    rows.push_back({color, text});
+  else
+    ++hidden;
+}
+
+QString TitleWithUnit(QString title, const std::string& unit) {
+  if (!unit.empty()) title += (title.isEmpty() ? "[" : " [") + ToQt(unit) + "]";
+  return title;
+}
+
+// ---- Colours of numbers
+
+ValueColors::ValueColors(const ValueScale& scale, const std::vector<double>& values, const DisplayUnits* units)
+    : names_(scale.names), unit_(scale.itemType, scale.unit, units) {
+  legend_.title = names_.empty() ? TitleWithUnit(ToQt(scale.title), unit_.Text()) : ToQt(scale.title);
+  if (names_.empty())
+    MakeClasses(values);
+  else
+    MakeKinds(values);
+}
+
+void ValueColors::MakeKinds(const std::vector<double>& values) {
+  for (std::size_t i = 0; i < names_.size(); ++i) {
+    colors_.emplace_back(CodeColor(i));
+    legend_.Add(colors_.back(), ToQt(names_[i].second));
+  }
+  colors_.emplace_back(kOthers);
+  if (std::ranges::any_of(values, [&](double value) { return Number(value) == names_.size(); }))
+    legend_.Add(colors_.back(), QCoreApplication::translate("MapPalette", "others"));
+}
+
+void ValueColors::MakeClasses(const std::vector<double>& values) {
+  legend_.isScale = true;
+  std::optional<std::pair<double, double>> range;
+  for (const double value : values) {
+    if (!std::isfinite(value)) continue;
+    if (!range) range = {value, value};
+    range = {std::min(range->first, value), std::max(range->second, value)};
+  }
+  if (range) {
+    const std::vector<double> shown = ClassBorders(unit_.Shown(range->first), unit_.Shown(range->second));
+    for (const double border : shown) borders_.push_back(unit_.Stored(border));
+    if (shown.size() == 1) {
+      borders_.push_back(borders_.front());
+      colors_.emplace_back(RampColor(0.5));
+      legend_.rows.push_back({colors_.back(), ToQt(FormatNumber(shown.front(), "%.6g"))});
+    }
+    for (std::size_t i = 0; i + 1 < shown.size(); ++i) {
+      // The palest colours are too weak for a line.
+      constexpr double kPalest = 0.2;
+      const double part = static_cast<double>(i) / static_cast<double>(shown.size() - 2);
+      colors_.emplace_back(RampColor(kPalest + (1 - kPalest) * part));
+      const double step = shown[1] - shown[0];
+      legend_.rows.insert(legend_.rows.begin(),
+                          {colors_.back(), QString::fromUtf8("%1 – %2").arg(NumberInSteps(shown[i], step),
+                                                                            NumberInSteps(shown[i + 1], step))});
+    }
+  }
+  colors_.emplace_back(kOthers);
+}
+
+std::size_t ValueColors::Number(double value) const {
+  if (!names_.empty()) {
+    const auto found = std::ranges::find(names_, value, &std::pair<double, std::string>::first);
+    return static_cast<std::size_t>(found - names_.begin());
+  }
+  if (std::isnan(value) || borders_.size() < 2) return colors_.size() - 1;
+  const auto above = std::upper_bound(borders_.begin() + 1, borders_.end() - 1, value) - borders_.begin() - 1;
+  return static_cast<std::size_t>(above);
+}
+
+QString ValueColors::TextOf(double value) const {
+  const auto found = std::ranges::find(names_, value, &std::pair<double, std::string>::first);
+  return found != names_.end() ? ToQt(found->second) : unit_.Value(value);
+}
+
+// ---- Colours of grids
+
 MapPalette MapPalette::Of(const GridLayer& layer, const DisplayUnits* units) {
   const CTvn2DOrthoRotatedGridData& grid = *layer.grid;
   MapPalette palette;
   palette.deleteValue_ = grid.DeleteValue();
   palette.colors_ = {qRgba(0, 0, 0, 0)};
-  if (layer.highlighted)
+  if (layer.highlighted.code)
     palette.MakeHighlighted(layer);
   else if (layer.isCodes)
-    palette.MakeCodes(grid);
+    palette.MakeCodes(layer);
   else
     palette.MakeClasses(layer, ShownUnit(grid.ItemType(), grid.ItemUnit(), units));
   return palette;
@@ -152,12 +212,13 @@ void MapPalette::MakeClasses(const GridLayer& layer, const ShownUnit& unit) {
     range = RangeOf(*layer.grid, std::max(smallest, -kMost), std::min(largest, kMost));
   }
   // The numbers are to be nice in the unit in which the user sees them.
+  legend_.isScale = true;
   const std::vector<double> shown = ClassBorders(unit.Shown(range.low), unit.Shown(range.high));
   for (const double border : shown) borders_.push_back(unit.Stored(border));
   if (shown.size() == 1) {
     borders_.push_back(borders_.front());
     colors_.push_back(RampColor(0.5));
-    legend_.push_back({QColor(colors_.back()), ToQt(FormatNumber(shown.front(), "%.6g"))});
+    legend_.rows.push_back({QColor(colors_.back()), ToQt(FormatNumber(shown.front(), "%.6g"))});
     return;
   }
   const std::size_t classes = shown.size() - 1;
@@ -169,29 +230,32 @@ void MapPalette::MakeClasses(const GridLayer& layer, const ShownUnit& unit) {
     QString text = QString::fromUtf8("%1 – %2").arg(from, to);
     if (i == 0 && range.isOpenBelow) text = QCoreApplication::translate("MapPalette", "below %1").arg(to);
     if (i + 1 == classes && range.isOpenAbove) text = QCoreApplication::translate("MapPalette", "above %1").arg(from);
-    legend_.insert(legend_.begin(), {QColor(colors_.back()), text});
+    legend_.rows.insert(legend_.rows.begin(), {QColor(colors_.back()), text});
   }
 }
 
-void MapPalette::MakeCodes(const CTvn2DOrthoRotatedGridData& grid) {
+void MapPalette::MakeCodes(const GridLayer& layer) {
   constexpr unsigned kSmallCodes = 1 << 16;
   kind_ = Kind::Codes;
-  if (!grid.GetIntValues(codes_)) return;
+  if (!layer.grid->GetIntValues(codes_)) return;
   const std::size_t count = std::min<std::size_t>(codes_.size(), kMostColors);
   for (std::size_t i = 0; i < count; ++i) colors_.push_back(CodeColor(i));
   colorOfCode_.resize(std::min(codes_.back() + 1, kSmallCodes));
   for (std::size_t i = 0; i < codes_.size() && codes_[i] < colorOfCode_.size(); ++i)
     colorOfCode_[codes_[i]] = static_cast<std::uint8_t>(1 + i % kMostColors);
-  for (std::size_t i = 0; i < std::min<std::size_t>(codes_.size(), kMostRows); ++i)
-    legend_.push_back({QColor(colors_[1 + i]), QString::number(codes_[i])});
+  for (std::size_t i = 0; i < codes_.size(); ++i) {
+    const auto name = std::ranges::find(layer.names, codes_[i], &std::pair<unsigned, std::string>::first);
+    legend_.Add(QColor(colors_[1 + i % kMostColors]),
+                name == layer.names.end() ? QString::number(codes_[i]) : ToQt(name->second));
+  }
 }
 
 void MapPalette::MakeHighlighted(const GridLayer& layer) {
   kind_ = Kind::Highlighted;
-  highlighted_ = *layer.highlighted;
+  highlighted_ = *layer.highlighted.code;
   colors_ = {colors_.front(), kHighlight, kOthers};
-  legend_ = {{QColor(kHighlight), ToQt(FormatNumber(static_cast<double>(highlighted_), "%.6g"))},
-             {QColor(kOthers), QCoreApplication::translate("MapPalette", "others")}};
+  legend_.Add(QColor(kHighlight), ToQt(FormatNumber(static_cast<double>(highlighted_), "%.6g")));
+  legend_.Add(QColor(kOthers), QCoreApplication::translate("MapPalette", "others"));
 }
 
 std::uint8_t MapPalette::ColorNumber(float value) const {

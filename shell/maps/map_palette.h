@@ -12,27 +12,9 @@
 #include <vector>
 
 #include "forms/plots.h"
-#include "platform/units.h"
+#include "shell/widgets/shown_unit.h"
 
 namespace tervane {
-
-/// The unit in which a user sees values that are stored in another one.
-class ShownUnit {
- public:
-  /// `units` are the user's; null for base units.
-  ShownUnit(int itemType, int storedUnit, const DisplayUnits* units);
-
-  double Shown(double stored) const { return toShown_(stored); }
-  double Stored(double shown) const { return toStored_(shown); }
-  /// "m³/s"; empty where nothing stands behind a number.
-  const std::string& Text() const { return text_; }
-  /// "412.5 m"
-  QString Value(double stored) const;
-
- private:
-  std::string text_;
-  UnitConversion toShown_, toStored_;
-};
 
 /// The smallest of 1, 2, 2.5 or 5 times a power of ten that is not below.
 double NiceStep(double atLeast);
@@ -42,15 +24,63 @@ std::vector<double> ClassBorders(double smallest, double largest);
 /// A number with as many decimals as multiples of the step need.
 QString NumberInSteps(double value, double step);
 
+/// From low to high, `part` within 0 and 1.
+QRgb RampColor(double part);
+/// Colours that are told apart side by side, one for each whole number from 0.
+QRgb CodeColor(std::size_t ordinal);
+
+struct LegendRow {
+  QColor color;
+  QString text;
+};
+
+/// What the legend says of one layer.
+struct LegendBlock {
+  static constexpr std::size_t kMostRows = 20;  ///< Of kinds.
+
+  QString title;
+  std::vector<LegendRow> rows;  ///< From the top down.
+  std::size_t hidden = 0;       ///< Kinds that are left out.
+  bool isScale = false;         ///< The rows are classes of one scale, drawn without gaps.
+  bool areLines = false;
+  double opacity = 1;
+
+  /// Adds a kind, or counts it where there are too many.
+  void Add(const QColor& color, const QString& text);
+};
+
+/// "Elevation [m]"
+QString TitleWithUnit(QString title, const std::string& unit);
+
+/// Colours of numbers by a `ValueScale`.
+class ValueColors {
+ public:
+  ValueColors() = default;
+  /// `units` are the user's; null for base units.
+  ValueColors(const ValueScale& scale, const std::vector<double>& values, const DisplayUnits* units);
+
+  const LegendBlock& Legend() const { return legend_; }
+  /// The place of the value's colour among `Colors`.
+  std::size_t Number(double value) const;
+  /// What a user reads of the value: its name, or the number with its unit.
+  QString TextOf(double value) const;
+  const std::vector<QColor>& Colors() const { return colors_; }
+
+ private:
+  void MakeKinds(const std::vector<double>& values);
+  void MakeClasses(const std::vector<double>& values);
+
+  std::vector<std::pair<double, std::string>> names_;
+  ShownUnit unit_{0, 0, nullptr};
+  std::vector<double> borders_;  ///< In the stored unit, one more than classes.
+  std::vector<QColor> colors_;   ///< The last one is that of kinds without a name.
+  LegendBlock legend_;
+};
+
 /// A colour for each value of a grid. Colours go by numbers from 1; 0 is an empty cell.
 class MapPalette {
  public:
-  struct Row {
-    QColor color;
-    QString text;
-  };
   static constexpr int kMostColors = 255;  ///< Codes beyond share colours.
-  static constexpr int kMostRows = 20;     ///< Of the codes in a legend.
 
   /// Looks through all cells, which takes its time for a large grid.
   static MapPalette Of(const GridLayer& layer, const DisplayUnits* units);
@@ -59,11 +89,7 @@ class MapPalette {
   /// Opaque colours by their numbers, and a transparent one in front.
   const std::vector<QRgb>& Colors() const { return colors_; }
   /// What the user reads, from the top down: classes from the highest to the lowest, codes ascending.
-  const std::vector<Row>& Legend() const { return legend_; }
-  /// Codes that the legend leaves out.
-  std::size_t HiddenCodes() const { return codes_.size() > kMostRows ? codes_.size() - kMostRows : 0; }
-  /// The classes are parts of one scale, drawn without gaps.
-  bool IsScale() const { return kind_ == Kind::Classes; }
+  const LegendBlock& Legend() const { return legend_; }
   /// Single cells count: coarser levels must not lose them.
   bool KeepsSingleCells() const { return kind_ != Kind::Classes; }
 
@@ -71,7 +97,7 @@ class MapPalette {
   enum class Kind { Classes, Codes, Highlighted };
 
   void MakeClasses(const GridLayer& layer, const ShownUnit& unit);
-  void MakeCodes(const CTvn2DOrthoRotatedGridData& grid);
+  void MakeCodes(const GridLayer& layer);
   void MakeHighlighted(const GridLayer& layer);
 
   Kind kind_ = Kind::Classes;
@@ -82,7 +108,7 @@ class MapPalette {
   std::vector<std::uint8_t> colorOfCode_;  ///< By the code, of small codes.
   float highlighted_ = 0;
   std::vector<QRgb> colors_;
-  std::vector<Row> legend_;
+  LegendBlock legend_;
 };
 
 }  // namespace tervane

@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/maps/map_view.h"
 
+#include <utility>
+
 #include "shell/maps/map_canvas.h"
 
 namespace tervane {
@@ -17,11 +19,14 @@ void MapView::Show(MapContent content, const DisplayUnits* units) {
   const DisplayUnits chosen = units ? *units : DisplayUnits();
   if (isShown_ && chosen == units_ && LooksSame(content, canvas_->Content())) {
     canvas_->SetPicked(std::move(content.picked));
+    canvas_->Ask(std::move(content.request));
     return;
   }
   isShown_ = true;
   units_ = chosen;
+  std::optional<MapRequest> request = std::exchange(content.request, {});
   canvas_->SetContent(std::move(content), units);
+  canvas_->Ask(std::move(request));
   SetStatus(canvas_->Summary());
 }
 

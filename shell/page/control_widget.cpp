@@ -48,7 +48,7 @@ bool LeavesToDocument(QEvent* event) {
 ControlWidget::ControlWidget(CYbSEDlgBase& page, Control& control) : page_(page), control_(control) {}
 
 std::unique_ptr<ControlWidget> ControlWidget::Make(CYbSEDlgBase& page, Control& control) {
-  for (const auto& make : {MakeOptionWidget, MakeFieldWidget, MakeReadingWidget, MakeLargeWidget})
+  for (const auto& make : {MakeOptionWidget, MakeFieldWidget, MakeReadingWidget, MakeReportWidget, MakeLargeWidget})
     if (std::unique_ptr<ControlWidget> widget = make(page, control)) return widget;
   return nullptr;
 }

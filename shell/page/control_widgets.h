@@ -18,6 +18,8 @@ std::unique_ptr<ControlWidget> MakeOptionWidget(CYbSEDlgBase& page, Control& con
 std::unique_ptr<ControlWidget> MakeFieldWidget(CYbSEDlgBase& page, Control& control);
 /// What is only read or pressed: labels, values, notices, buttons, texts, a browser.
 std::unique_ptr<ControlWidget> MakeReadingWidget(CYbSEDlgBase& page, Control& control);
+/// A report in HTML.
+std::unique_ptr<ControlWidget> MakeReportWidget(CYbSEDlgBase& page, Control& control);
 /// What takes all the room that it gets: tables, maps, charts.
 std::unique_ptr<ControlWidget> MakeLargeWidget(CYbSEDlgBase& page, Control& control);
 

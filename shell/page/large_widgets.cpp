@@ -3,6 +3,7 @@
 #include <QHBoxLayout>
 
 #include "forms/plots.h"
+#include "shell/charts/section_view.h"
 #include "shell/charts/series_plot.h"
 #include "shell/maps/map_canvas.h"
 #include "shell/maps/map_view.h"
@@ -79,6 +80,28 @@ class ChartWidget : public ControlWidget {
   SeriesPlot* plot_;
 };
 
+class SectionWidget : public ControlWidget {
+ public:
+  SectionWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    view_ = new SectionView(page.Outside());
+    MakeField(view_, true);
+  }
+  bool GrowsDown() const override { return true; }
+  bool GrowsRight() const override { return true; }
+  QWidget* FocusTarget() const override { return &view_->Chart(); }
+
+ protected:
+  void SyncValue() override {
+    if (Described().IsShown())
+      view_->ShowWhenThere(Described().section, Described().displayUnits);
+    else
+      view_->StopWaiting();
+  }
+
+ private:
+  SectionView* view_;
+};
+
 }  // namespace
 
 std::unique_ptr<ControlWidget> MakeLargeWidget(CYbSEDlgBase& page, Control& control) {
@@ -89,6 +112,8 @@ std::unique_ptr<ControlWidget> MakeLargeWidget(CYbSEDlgBase& page, Control& cont
       return std::make_unique<MapWidget>(page, control);
     case ControlKind::Chart:
       return std::make_unique<ChartWidget>(page, control);
+    case ControlKind::Section:
+      return std::make_unique<SectionWidget>(page, control);
     default:
       return nullptr;
   }

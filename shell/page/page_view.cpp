@@ -148,8 +148,7 @@ QWidget* PageView::BuildForm(PageForm& form, int depth) {
     row.clear();
   };
   for (const auto& control : form.Controls()) {
-    const bool isPlot = control->kind == ControlKind::Map || control->kind == ControlKind::Chart;
-    if (isPlot && &form == &page_.Form()) {
+    if (IsPlot(control->kind) && &form == &page_.Form()) {
       AddPlot(*control);
       continue;
     }

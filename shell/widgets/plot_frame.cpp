@@ -48,23 +48,23 @@ void PlotFrame::Hold(Plot plot) {
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(2);
   column->addWidget(plot_.widget, 1);
-  auto* row = new QHBoxLayout;
-  row->setSpacing(2);
-  row->addSpacing(Theme::Get().Scaled(4));
-  row->addWidget(status_, 1);
+  row_ = new QHBoxLayout;
+  row_->setSpacing(2);
+  row_->addSpacing(Theme::Get().Scaled(4));
+  row_->addWidget(status_, 1);
   const auto add = [&](const QString& icon, const QString& tip, std::function<void()> command) {
     auto* button = new QToolButton;
     button->setAutoRaise(true);
     button->setToolTip(tip);
     button->setAccessibleName(tip);
     connect(button, &QToolButton::clicked, this, std::move(command));
-    row->addWidget(button);
+    row_->addWidget(button);
     buttons_.emplace_back(button, icon);
   };
   add("insert", tr("Zoom in (+)"), [this] { plot_.zoom(kZoomStep); });
   add("zoom_out", tr("Zoom out (-)"), [this] { plot_.zoom(1 / kZoomStep); });
   add("fit", tr("Show everything (Home)"), [this] { plot_.fit(); });
-  column->addLayout(row);
+  column->addLayout(row_);
   plot_.widget->setContextMenuPolicy(Qt::ActionsContextMenu);
   AddCommand(tr("&Fit"), [this] { plot_.fit(); });
   AddCommand(tr("&Copy picture"), [this] { QApplication::clipboard()->setImage(plot_.picture(kPaperRatio)); });
@@ -97,6 +97,11 @@ void PlotFrame::StopWaiting() {
 void PlotFrame::showEvent(QShowEvent* event) {
   QWidget::showEvent(event);
   if (std::exchange(isAgainDue_, false)) again_();
+}
+
+void PlotFrame::AddToRow(QWidget* tool) {
+  constexpr int kBehindStatus = 2;
+  row_->insertWidget(kBehindStatus, tool);
 }
 
 QAction* PlotFrame::AddCommand(const QString& text, std::function<void()> command) {

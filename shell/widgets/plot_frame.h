@@ -12,6 +12,7 @@
 #include "forms/plots.h"
 #include "shell/widgets/background.h"
 
+class QHBoxLayout;
 class QLabel;
 class QToolButton;
 
@@ -43,6 +44,8 @@ class PlotFrame : public QWidget {
  protected:
   PlotFrame(Host& host, QWidget* parent);
   void Hold(Plot plot);
+  /// A further control in front of the buttons.
+  void AddToRow(QWidget* tool);
   /// A further command of the context menu.
   QAction* AddCommand(const QString& text, std::function<void()> command);
   void resizeEvent(QResizeEvent* event) override;
@@ -71,6 +74,7 @@ class PlotFrame : public QWidget {
   std::function<void()> again_;
   bool isAgainDue_ = false;  ///< What was waited for came while nobody saw the plot.
   QLabel* status_;
+  QHBoxLayout* row_ = nullptr;  ///< The line below the plot.
   std::vector<std::pair<QToolButton*, QString>> buttons_;
 };
 

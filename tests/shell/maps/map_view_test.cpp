@@ -11,68 +11,22 @@
 #include "shell/maps/map_canvas.h"
 #include "shell/maps/map_palette.h"
 #include "shell/widgets/theme.h"
+#include "tests/shell/maps/shown_map.h"
 #include "tests/shell/plot_events.h"
 
 namespace tervane {
 namespace {
 
-using test::Hover;
 using test::Wheel;
 using testing::ElementsAre;
 using testing::HasSubstr;
 
-constexpr int kElevation = 100180;
-constexpr float kEmpty = -9999;
-
-std::shared_ptr<const CTvn2DOrthoRotatedGridData> Grid(GridGeometry geometry, std::vector<float> values,
-                                                       int itemType = kElevation, int unit = 1000) {
-  auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
-  EXPECT_EQ(grid->TakeValues(geometry, std::move(values), kEmpty, unit, itemType), "");
-  return grid;
-}
-
-/// 0, 1, 2, ... along the rows from the south.
-std::shared_ptr<const CTvn2DOrthoRotatedGridData> Counting(const GridGeometry& geometry) {
-  std::vector<float> values(geometry.CellCount());
-  for (std::size_t i = 0; i < values.size(); ++i) values[i] = static_cast<float>(i);
-  return Grid(geometry, std::move(values));
-}
-
-std::shared_ptr<const CYbShapeData> Square(double from, double to, double holeFrom, double holeTo) {
-  auto shapes = std::make_shared<CTvnShapeData>();
-  shapes->Create(ShapeKind::Polygon, {{"NAME", AttributeKind::Text}}, {});
-  Shape shape;
-  shape.points = {{from, from},         {from, to},         {to, to},         {to, from},         {from, from},
-                  {holeFrom, holeFrom}, {holeTo, holeFrom}, {holeTo, holeTo}, {holeFrom, holeTo}, {holeFrom, holeFrom}};
-  shape.parts = {0, 5};
-  shape.values = {std::string("Skjern")};
-  shapes->AddShape(shape);
-  return shapes;
-}
-
-/// A map on the screen, worked as a user works it.
-class ShownMap {
- public:
-  explicit ShownMap(MapContent content, const DisplayUnits* units = nullptr) : view_(host_) {
-    view_.resize(700, 500);
-    view_.Show(std::move(content), units);
-    view_.show();
-    Canvas().WaitUntilReady();
-    QApplication::processEvents();
-  }
-  MapView& View() { return view_; }
-  MapCanvas& Canvas() { return view_.Canvas(); }
-  QPointF At(MapPoint place) { return Canvas().Window().ToScreen(place); }
-  QColor ColorAt(MapPoint place) { return Canvas().grab().toImage().pixelColor(At(place).toPoint()); }
-  std::string TextAt(MapPoint place) {
-    Hover(Canvas(), At(place));
-    return view_.Status().toStdString();
-  }
-
- private:
-  NobodyToAsk host_;
-  MapView view_;
-};
+using test::Counting;
+using test::Grid;
+using test::kElevation;
+using test::kEmpty;
+using test::ShownMap;
+using test::Square;
 
 TEST(MapView, ClassesHaveBordersAtNumbersThatPeopleLike) {
   EXPECT_THAT(ClassBorders(193, 4292.8), ElementsAre(0, 500, 1000, 1500, 2000, 2500, 3000, 3500, 4000, 4500));
@@ -94,8 +48,8 @@ TEST(MapView, AValueOnABorderHasTheColourOfTheClassAboveInTheUsersUnit) {
   feet.Choose(kElevation, 1003);
   const auto grid = Grid({4, 1, 100, 0, 0, 0, {}}, {0, 0.3048F * 100, 0.3048F * 1000, 0.3048F * 99.9F});
   const MapPalette palette = MapPalette::Of({grid}, &feet);
-  EXPECT_EQ(palette.Legend().back().text.toStdString(), "0 – 100");
-  EXPECT_EQ(palette.Legend().front().text.toStdString(), "900 – 1000");
+  EXPECT_EQ(palette.Legend().rows.back().text.toStdString(), "0 – 100");
+  EXPECT_EQ(palette.Legend().rows.front().text.toStdString(), "900 – 1000");
   EXPECT_EQ(palette.ColorNumber(0.3048F * 99.9F), 1);
   EXPECT_EQ(palette.ColorNumber(0.3048F * 100), 2);
   EXPECT_EQ(palette.ColorNumber(0.3048F * 1000), 10);
@@ -104,18 +58,19 @@ TEST(MapView, AValueOnABorderHasTheColourOfTheClassAboveInTheUsersUnit) {
   std::vector<float> values(10'000);
   for (std::size_t i = 0; i < values.size(); ++i) values[i] = static_cast<float>(i % 100);
   values[17] = 1e6F;
-  EXPECT_THAT(MapPalette::Of({Grid({100, 100, 1, 0, 0, 0, {}}, values)}, nullptr).Legend().front().text.toStdString(),
-              HasSubstr("above 90"));
+  EXPECT_THAT(
+      MapPalette::Of({Grid({100, 100, 1, 0, 0, 0, {}}, values)}, nullptr).Legend().rows.front().text.toStdString(),
+      HasSubstr("above 90"));
 }
 
 TEST(MapView, TheLegendOfCodesTellsTwentyAndHowManyMore) {
   std::vector<float> codes;
   for (int i = 0; i < 300; ++i) codes.push_back(static_cast<float>(i + 7));
   const MapPalette palette = MapPalette::Of({Grid({300, 1, 1, 0, 0, 0, {}}, codes), true}, nullptr);
-  EXPECT_EQ(palette.Legend().size(), 20U);
-  EXPECT_EQ(palette.Legend()[3].text.toStdString(), "10");
-  EXPECT_EQ(palette.HiddenCodes(), 280U);
-  EXPECT_EQ(QColor(palette.Colors()[palette.ColorNumber(10)]), palette.Legend()[3].color);
+  EXPECT_EQ(palette.Legend().rows.size(), 20U);
+  EXPECT_EQ(palette.Legend().rows[3].text.toStdString(), "10");
+  EXPECT_EQ(palette.Legend().hidden, 280U);
+  EXPECT_EQ(QColor(palette.Colors()[palette.ColorNumber(10)]), palette.Legend().rows[3].color);
   for (int i = 0; i < 300; ++i) EXPECT_NE(palette.ColorNumber(static_cast<float>(i + 7)), 0);
 }
 
@@ -152,7 +107,7 @@ TEST(MapView, ASingleCellOfACodeIsSeenFromAfar) {
   MapContent content;
   content.grids = {{grid, true}};
   ShownMap map(std::move(content));
-  const QColor color = MapPalette::Of({grid, true}, nullptr).Legend()[1].color;
+  const QColor color = MapPalette::Of({grid, true}, nullptr).Legend().rows[1].color;
   const MapPoint cell = grid->CellCentre(1234, 777);
   const QImage picture = map.Canvas().grab().toImage();
   const QPoint at = map.At(cell).toPoint();
@@ -243,7 +198,8 @@ TEST(MapView, TheSameContentLeavesThePictureAndAnotherGridKeepsThePlace) {
   const QColor before = map.ColorAt({525, 525});
   map.View().Show(content, nullptr);
   EXPECT_EQ(map.Canvas().Window().metresPerPixel, zoomed);
-  content.grids = {{Counting(geometry), false, 12.0F}};
+  content.grids = {{Counting(geometry)}};
+  LetStandOut(content, {.code = 12.0F});
   map.View().Show(content, nullptr);
   EXPECT_EQ(map.Canvas().Window().metresPerPixel, zoomed);
   EXPECT_NE(map.ColorAt({525, 525}), before);

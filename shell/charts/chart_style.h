@@ -1,0 +1,25 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The looks that all charts have in common.
+#pragma once
+
+#include <QColor>
+
+class QCustomPlot;
+
+namespace tervane {
+
+/// Colours of curves that are told apart on white and on dark ground, also by people who confuse red and green.
+QColor CurveColor(std::size_t number, bool onDark);
+/// Quiet colours of layers of the ground, which lie beside each other.
+QColor LayerColor(std::size_t number, bool onDark);
+
+/// Colours, fonts and sizes of the theme for the chart's axes, its legend and the box of a zoom.
+void StyleChart(QCustomPlot& chart);
+/// The legend stands above the chart, where it hides nothing.
+void PutLegendAbove(QCustomPlot& chart);
+/// As many columns of names as there is room for, each `widest` pixels beside its swatch.
+void ArrangeLegend(QCustomPlot& chart, int widest);
+
+}  // namespace tervane

@@ -1,0 +1,317 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/charts/section_view.h"
+
+#include <QApplication>
+#include <QComboBox>
+#include <QLabel>
+#include <algorithm>
+#include <cmath>
+#include <utility>
+
+#include <qcustomplot.h>
+
+#include "shell/charts/chart_style.h"
+#include "shell/charts/section_bands.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/shown_unit.h"
+#include "shell/widgets/theme.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr double kZoomStep = 1.5;
+constexpr const char* kPointerLayer = "pointer";
+constexpr int kDistanceType = 100217, kElevationType = 100180, kMetre = 1000;
+constexpr std::array kExaggerations{1, 2, 5, 10, 20, 50, 100, 200};
+
+}  // namespace
+
+struct SectionView::Units {
+  ShownUnit distance, height;
+};
+
+SectionView::SectionView(Host& host, QWidget* parent)
+    : PlotFrame(host, parent), chart_(new QCustomPlot), message_(new QLabel(chart_)), choice_(new QComboBox) {
+  chart_->setMinimumSize(Theme::Get().Scaled(200), Theme::Get().Scaled(140));
+  chart_->setFocusPolicy(Qt::StrongFocus);
+  chart_->installEventFilter(this);
+  chart_->setInteractions(QCP::iRangeDrag | QCP::iRangeZoom);
+  chart_->axisRect()->setRangeZoom(Qt::Horizontal);
+  chart_->addLayer(kPointerLayer, chart_->layer("overlay"), QCustomPlot::limBelow);
+  chart_->layer(kPointerLayer)->setMode(QCPLayer::lmBuffered);
+  PutLegendAbove(*chart_);
+  message_->setAlignment(Qt::AlignCenter);
+  message_->setWordWrap(true);
+  message_->setMargin(Theme::Get().Scaled(16));
+  message_->setAutoFillBackground(true);
+  message_->setBackgroundRole(QPalette::Base);
+  Hold({chart_, [this](double factor) { Zoom(factor); }, [this] { Fit(); },
+        [this](double pixelRatio) {
+          return chart_->toPixmap(chart_->width(), chart_->height(), pixelRatio).toImage();
+        }});
+  choice_->addItem(QString());
+  for (const int times : kExaggerations) choice_->addItem(QString::fromUtf8("%1 ×").arg(times), times);
+  choice_->setToolTip(tr("How many times heights are drawn larger than distances"));
+  choice_->setAccessibleName(tr("Vertical exaggeration"));
+  choice_->setFocusPolicy(Qt::TabFocus);
+  choice_->setSizeAdjustPolicy(QComboBox::AdjustToContents);
+  AddToRow(choice_);
+  connect(choice_, &QComboBox::activated, this, [this](int index) {
+    SetExaggeration(index == 0 ? std::nullopt : std::optional<double>(choice_->itemData(index).toDouble()));
+  });
+  connect(chart_, &QCustomPlot::beforeReplot, this, &SectionView::Arrange);
+  // The exaggeration depends on the place that the layout leaves.
+  connect(chart_, &QCustomPlot::afterLayout, this, &SectionView::FitHeights);
+  connect(chart_, &QCustomPlot::mouseMove, this, &SectionView::PointAt);
+  connect(chart_, &QCustomPlot::mouseDoubleClick, this, &SectionView::Fit);
+  connect(&Theme::Get(), &Theme::Changed, this, [this] {
+    ApplyTheme();
+    chart_->replot(QCustomPlot::rpQueuedReplot);
+  });
+}
+
+SectionView::~SectionView() = default;
+
+void SectionView::Show(SectionContent content, const DisplayUnits* units) {
+  const DisplayUnits chosen = units ? *units : DisplayUnits();
+  if (isShown_ && chosen == displayUnits_ && LooksSame(content, content_)) return;
+  isShown_ = true;
+  content_ = std::move(content);
+  displayUnits_ = chosen;
+  units_ = std::make_unique<Units>(
+      Units{ShownUnit(kDistanceType, kMetre, &displayUnits_), ShownUnit(kElevationType, kMetre, &displayUnits_)});
+  Build();
+}
+
+void SectionView::ShowWhenThere(const std::function<SectionContent()>& content, const DisplayUnits* units) {
+  SectionContent now = Follow<SectionContent>(content, [this, content, units] { ShowWhenThere(content, units); });
+  if (!now.awaited.empty() && isShown_) return;
+  if (!now.awaited.empty() && now.message.empty()) now.message = " ";
+  now.awaited.clear();
+  Show(std::move(now), units);
+}
+
+void SectionView::Build() {
+  chart_->clearPlottables();
+  chart_->clearItems();
+  bands_.clear();
+  ground_ = nullptr;
+  pointer_ = nullptr;
+  profile_ = ProfileOf(content_, StepFor(content_));
+  message_->setText(content_.message.empty() ? tr("There is nothing to show.") : Translated(content_.message));
+  message_->setVisible(content_.IsEmpty());
+  choice_->setEnabled(!content_.IsEmpty());
+  if (!content_.IsEmpty()) {
+    const auto shown = [](const ShownUnit& unit, std::vector<double> values) {
+      for (double& value : values) value = unit.Shown(value);
+      return values;
+    };
+    std::vector<double> distances;
+    for (const SectionPoint& point : profile_.points) distances.push_back(units_->distance.Shown(point.distance));
+    for (const SectionProfile::Band& band : profile_.bands) {
+      auto* drawn = new BandPlottable(chart_->xAxis, chart_->yAxis);
+      drawn->SetData(distances, shown(units_->height, band.top), shown(units_->height, band.bottom));
+      drawn->setName(ToQt(band.name));
+      bands_.push_back(drawn);
+    }
+    const std::vector<double> ground = shown(units_->height, profile_.ground);
+    ground_ = chart_->addGraph();
+    ground_->setData(QVector<double>(distances.begin(), distances.end()), QVector<double>(ground.begin(), ground.end()),
+                     true);
+    ground_->setName(tr("Ground"));
+    pointer_ = new QCPItemStraightLine(chart_);
+    pointer_->setLayer(kPointerLayer);
+    pointer_->setVisible(false);
+    pointer_->point1->setTypeY(QCPItemPosition::ptAxisRectRatio);
+    pointer_->point2->setTypeY(QCPItemPosition::ptAxisRectRatio);
+  }
+  chart_->xAxis->setLabel(tr("Distance [%1]").arg(ToQt(units_->distance.Text())));
+  chart_->yAxis->setLabel(tr("Elevation [%1]").arg(ToQt(units_->height.Text())));
+  for (QCPAxis* axis : {chart_->xAxis2, chart_->yAxis2}) {
+    axis->setVisible(true);
+    axis->setTicks(false);
+    axis->setTickLabels(false);
+  }
+  SetStatus({});
+  ApplyTheme();
+  Fit();
+}
+
+void SectionView::ApplyTheme() {
+  StyleChart(*chart_);
+  const Theme& theme = Theme::Get();
+  const QColor ink = QApplication::palette().color(QPalette::Text);
+  for (std::size_t i = 0; i < bands_.size(); ++i) {
+    const auto& told = content_.surfaces[i].color;
+    bands_[i]->setBrush(told ? QColor::fromRgb(*told) : LayerColor(i, theme.IsDark()));
+    QColor border = ink;
+    border.setAlpha(110);
+    bands_[i]->setPen(QPen(border, 1));
+  }
+  if (ground_) ground_->setPen(QPen(ink, 2 * theme.Zoom()));
+  if (pointer_) pointer_->setPen(QPen(theme.QuietColor(), 1, Qt::DashLine));
+  // The bands cover the lines of the axes' grid, which help to read heights and distances.
+  for (QCPAxis* axis : {chart_->xAxis, chart_->yAxis}) axis->grid()->setZeroLinePen(axis->grid()->pen());
+  QPalette quiet = QApplication::palette();
+  quiet.setColor(QPalette::WindowText, theme.QuietColor());
+  message_->setPalette(quiet);
+}
+
+void SectionView::Arrange() {
+  const QFontMetrics metrics(QApplication::font());
+  int widest = metrics.horizontalAdvance(tr("Ground"));
+  for (const BandPlottable* band : bands_) widest = std::max(widest, metrics.horizontalAdvance(band->name()));
+  ArrangeLegend(*chart_, widest);
+  const int distances = chart_->axisRect()->width() / (metrics.horizontalAdvance("000000") * 2);
+  chart_->xAxis->ticker()->setTickCount(std::clamp(distances, 2, 9));
+  const int heights = chart_->axisRect()->height() / (3 * metrics.height());
+  chart_->yAxis->ticker()->setTickCount(std::clamp(heights, 2, 7));
+}
+
+/// Heights follow the distances that are seen: by the exaggeration, or so that they fill the view.
+void SectionView::FitHeights() {
+  if (content_.IsEmpty()) return;
+  QCPAxis& heights = *chart_->yAxis;
+  const QCPRange seen = chart_->xAxis->range();
+  chart_->axisRect()->setRangeDrag(exaggeration_ ? Qt::Horizontal | Qt::Vertical : Qt::Orientations(Qt::Horizontal));
+  if (exaggeration_) {
+    const double metresPerPixel = (units_->distance.Stored(seen.upper) - units_->distance.Stored(seen.lower)) /
+                                  std::max(chart_->axisRect()->width(), 1);
+    const double size = metresPerPixel / *exaggeration_ * chart_->axisRect()->height();
+    const double middle = units_->height.Stored(heights.range().center());
+    heights.setRange(units_->height.Shown(middle - size / 2), units_->height.Shown(middle + size / 2));
+  } else if (const auto range =
+                 profile_.Range(units_->distance.Stored(seen.lower), units_->distance.Stored(seen.upper))) {
+    const double size = range->second > range->first ? range->second - range->first : 1;
+    heights.setRange(units_->height.Shown(range->first - 0.05 * size),
+                     units_->height.Shown(range->second + 0.1 * size));
+  }
+  TellExaggeration();
+}
+
+double SectionView::Exaggeration() const {
+  const auto metresPerPixel = [](const QCPAxis& axis, const ShownUnit& unit, int pixels) {
+    return (unit.Stored(axis.range().upper) - unit.Stored(axis.range().lower)) / std::max(pixels, 1);
+  };
+  return metresPerPixel(*chart_->xAxis, units_->distance, chart_->axisRect()->width()) /
+         metresPerPixel(*chart_->yAxis, units_->height, chart_->axisRect()->height());
+}
+
+void SectionView::TellExaggeration() {
+  if (exaggeration_) return choice_->setItemText(0, tr("Fill"));
+  const double times = Exaggeration();
+  choice_->setItemText(0, tr("Fill (%1)").arg(QString::fromUtf8("%1 ×").arg(ToQt(FormatNumber(times, "%.2g")))));
+}
+
+void SectionView::SetExaggeration(std::optional<double> times) {
+  exaggeration_ = times;
+  const int index = times ? choice_->findData(static_cast<int>(*times)) : 0;
+  choice_->setCurrentIndex(std::max(index, 0));
+  Fit();
+}
+
+void SectionView::Fit() {
+  if (!profile_.points.empty()) {
+    chart_->xAxis->setRange(0, units_->distance.Shown(profile_.points.back().distance));
+    if (const auto range = profile_.Range(0, profile_.points.back().distance))
+      chart_->yAxis->setRange(units_->height.Shown(range->first), units_->height.Shown(range->second));
+  }
+  chart_->replot(QCustomPlot::rpQueuedReplot);
+}
+
+void SectionView::Zoom(double factor) {
+  chart_->xAxis->scaleRange(1 / factor);
+  chart_->replot(QCustomPlot::rpQueuedReplot);
+}
+
+bool SectionView::Press(int key) {
+  const auto move = [](QCPAxis* axis, double part) { axis->moveRange(part * axis->range().size()); };
+  switch (key) {
+    case Qt::Key_Plus:
+    case Qt::Key_Equal:
+      return Zoom(kZoomStep), true;
+    case Qt::Key_Minus:
+      return Zoom(1 / kZoomStep), true;
+    case Qt::Key_Left:
+      move(chart_->xAxis, -0.15);
+      break;
+    case Qt::Key_Right:
+      move(chart_->xAxis, 0.15);
+      break;
+    case Qt::Key_Up:
+      move(chart_->yAxis, 0.15);
+      break;
+    case Qt::Key_Down:
+      move(chart_->yAxis, -0.15);
+      break;
+    case Qt::Key_Home:
+      return Fit(), true;
+    default:
+      return false;
+  }
+  chart_->replot(QCustomPlot::rpQueuedReplot);
+  return true;
+}
+
+bool SectionView::eventFilter(QObject* watched, QEvent* event) {
+  if (event->type() == QEvent::KeyPress && !content_.IsEmpty()) return Press(static_cast<QKeyEvent*>(event)->key());
+  if (event->type() == QEvent::Resize) message_->setGeometry(chart_->rect());
+  if (event->type() == QEvent::Leave) {
+    SetStatus({});
+    if (pointer_) {
+      pointer_->setVisible(false);
+      chart_->layer(kPointerLayer)->replot();
+    }
+  }
+  return PlotFrame::eventFilter(watched, event);
+}
+
+void SectionView::PointAt(const QMouseEvent* event) {
+  if (!pointer_) return;
+  const bool isInside = chart_->axisRect()->rect().contains(event->pos());
+  const double distance = chart_->xAxis->pixelToCoord(event->position().x());
+  pointer_->setVisible(isInside);
+  pointer_->point1->setCoords(distance, 0);
+  pointer_->point2->setCoords(distance, 1);
+  chart_->layer(kPointerLayer)->replot();
+  const double height = chart_->yAxis->pixelToCoord(event->position().y());
+  SetStatus(isInside ? TextAt(units_->distance.Stored(distance), units_->height.Stored(height)) : QString());
+  chart_->setToolTip(isInside ? LayersAt(units_->distance.Stored(distance)) : QString());
+}
+
+std::optional<std::size_t> SectionView::SampleAt(double distance) const {
+  const auto& points = profile_.points;
+  if (points.empty() || distance < 0 || distance > points.back().distance) return {};
+  auto next = std::ranges::lower_bound(points, distance, {}, &SectionPoint::distance);
+  if (next != points.begin() && distance - (next - 1)->distance < next->distance - distance) --next;
+  return static_cast<std::size_t>(next - points.begin());
+}
+
+QString SectionView::HeightText(double height) const {
+  return std::isnan(height) ? tr("no value") : units_->height.Value(std::round(height * 100) / 100);
+}
+
+QString SectionView::TextAt(double distance, double height) const {
+  const auto at = SampleAt(distance);
+  if (!at) return {};
+  QString text = tr("at %1").arg(units_->distance.Value(std::round(profile_.points[*at].distance)));
+  text += "   " + tr("ground %1").arg(HeightText(profile_.ground[*at]));
+  for (const SectionProfile::Band& band : profile_.bands)
+    if (height < band.top[*at] && height >= band.bottom[*at])
+      text +=
+          "   " + tr("%1 from %2 to %3").arg(ToQt(band.name), HeightText(band.top[*at]), HeightText(band.bottom[*at]));
+  return text;
+}
+
+QString SectionView::LayersAt(double distance) const {
+  const auto at = SampleAt(distance);
+  if (!at) return {};
+  QString text = tr("ground %1").arg(HeightText(profile_.ground[*at]));
+  for (const SectionProfile::Band& band : profile_.bands)
+    text += "\n" + tr("%1 down to %2").arg(ToQt(band.name), HeightText(band.bottom[*at]));
+  return text;
+}
+
+}  // namespace tervane
