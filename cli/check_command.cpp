@@ -6,15 +6,19 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
 #include "cli/json.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "pages/findings.h"
 
 namespace tervane {
 
 namespace {
+
+struct CheckOptions {
+  std::string file;
+  bool json = false, coverage = false;
+};
 
 std::string_view KindName(KvfUnread::Kind kind) {
   switch (kind) {
@@ -65,8 +69,6 @@ void WriteText(const std::string& file, const std::vector<SetupFinding>& finding
   if (findings.empty()) fmt::print(out, "{}: no findings\n", file);
 }
 
-}  // namespace
-
 int CheckCommand(const std::string& file, bool json, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
@@ -76,6 +78,21 @@ int CheckCommand(const std::string& file, bool json, Streams streams) {
   else
     WriteText(file, findings, streams.out);
   return std::ranges::any_of(findings, NeedsAttention) ? kFindings : kDone;
+}
+
+}  // namespace
+
+void OfferCheckCommand(CommandOffers& offers) {
+  auto options = std::make_shared<CheckOptions>();
+  CLI::App* check = offers.Command(
+      "check", "List errors, warnings, notes and what the file holds that nothing reads", [offers, options] {
+        return options->coverage ? CoverageCommand(options->file, options->json, offers.Output())
+                                 : CheckCommand(options->file, options->json, offers.Output());
+      });
+  AddSetup(check, options->file);
+  check->add_flag("--json", options->json, "As JSON");
+  check->add_flag("--coverage", options->coverage,
+                  "Instead, how the data cover simulation and domain, and what the forcings come to each year");
 }
 
 }  // namespace tervane

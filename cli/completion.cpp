@@ -1,9 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "cli/completion.h"
-
-#include <CLI/CLI.hpp>
 #include <fmt/format.h>
+
+#include "cli/offers.h"
 
 namespace tervane {
 
@@ -16,8 +15,7 @@ std::string OptionNames(const CLI::App& app) {
   return names;
 }
 
-}  // namespace
-
+/// A script that completes the commands and options of the program, file names, and places of a setup.
 std::string BashCompletion(const CLI::App& app) {
   std::string commands, cases;
   for (const CLI::App* command : app.get_subcommands({})) {
@@ -53,6 +51,15 @@ _tervane() {{
 complete -o filenames -F _tervane tervane
 )bash",
                      commands.substr(1), OptionNames(app), cases);
+}
+
+}  // namespace
+
+void OfferCompletion(CommandOffers& offers) {
+  offers.Command("completion", "Print the completion script for bash; use: source <(tervane completion)", [offers] {
+    offers.Output().out << BashCompletion(offers.Whole());
+    return kDone;
+  });
 }
 
 }  // namespace tervane

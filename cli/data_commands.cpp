@@ -7,9 +7,8 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
 #include "cli/json.h"
+#include "cli/offers.h"
 #include "data/datafile.h"
 #include "data/datafile_request.h"
 #include "geometry/shapes.h"
@@ -219,8 +218,6 @@ bool HasExtension(const std::string& path, std::initializer_list<std::string_vie
   return std::ranges::find(extensions, LowerCase(ExtensionOf(path))) != extensions.end();
 }
 
-}  // namespace
-
 int DataInfoCommand(const std::string& path, bool json, Streams streams) {
   if (HasExtension(path, {".shp"})) return TellShapes(path, json, streams);
   if (HasExtension(path, {".txt", ".xyz"})) return TellPoints(path, json, streams);
@@ -260,6 +257,25 @@ int DataStatsCommand(const std::string& path, Streams streams) {
     }
   }
   return kDone;
+}
+
+}  // namespace
+
+void OfferDataCommands(CommandOffers& offers) {
+  struct Options {
+    std::string file;
+    bool json = false;
+  };
+  auto options = std::make_shared<Options>();
+  CLI::App* data = offers.Family("data", "Look into data files (.nds0 to .nds3, netCDF) and rasters (GeoTIFF, ...)");
+  CLI::App* info = offers.Command(
+      "info", "Tell items, times and place",
+      [offers, options] { return DataInfoCommand(options->file, options->json, offers.Output()); }, data);
+  CLI::App* stats = offers.Command(
+      "stats", "Tell range, mean and missing values of each item",
+      [offers, options] { return DataStatsCommand(options->file, offers.Output()); }, data);
+  for (CLI::App* command : {info, stats}) command->add_option("FILE", options->file, "The data file")->required();
+  info->add_flag("--json", options->json, "As JSON");
 }
 
 }  // namespace tervane

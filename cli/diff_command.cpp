@@ -5,9 +5,8 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
 #include "cli/json.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "document/setup_diff.h"
 
@@ -61,8 +60,6 @@ std::string Json(const SetupDifference& difference) {
                      {"toDefault", difference.toDefault ? "true" : ""}});
 }
 
-}  // namespace
-
 int DiffCommand(const std::string& from, const std::string& to, bool json, Streams streams) {
   CFlowModelDoc a, b;
   if (!OpenSetup(a, from, streams) || !OpenSetup(b, to, streams)) return kCouldNot;
@@ -78,6 +75,22 @@ int DiffCommand(const std::string& from, const std::string& to, bool json, Strea
     for (const SetupDifference& difference : differences) fmt::print(streams.out, "{}\n", Line(difference));
   }
   return differences.empty() ? kDone : kFindings;
+}
+
+}  // namespace
+
+void OfferDiffCommand(CommandOffers& offers) {
+  struct Options {
+    std::string from, to;
+    bool json = false;
+  };
+  auto options = std::make_shared<Options>();
+  CLI::App* diff = offers.Command("diff", "Compare two setups by section and key", [offers, options] {
+    return DiffCommand(options->from, options->to, options->json, offers.Output());
+  });
+  diff->add_option("A", options->from, "The old setup")->required();
+  diff->add_option("B", options->to, "The new setup")->required();
+  diff->add_flag("--json", options->json, "As JSON");
 }
 
 }  // namespace tervane

@@ -6,8 +6,7 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
+#include "cli/offers.h"
 #include "data/raster_file.h"
 #include "data/series_csv.h"
 #include "platform/files.h"
@@ -17,6 +16,14 @@
 namespace tervane {
 
 namespace {
+
+/// What of a data file is written for other programs.
+struct Export {
+  std::string in, out;
+  int item = 1, step = 1, layer = 1;  ///< Of grids.
+  bool isPartNamed = false;           ///< One of them was given.
+  bool force = false;
+};
 
 FileResult Failed(std::string error) { return {std::move(error), {}}; }
 
@@ -42,8 +49,6 @@ FileResult WriteRaster(const DataFile& file, const Export& wanted) {
   return WriteGeoTiff(wanted.out, {item.geometry, item.name, item.itemType, item.unitKey, item.unitText}, values);
 }
 
-}  // namespace
-
 int ExportCommand(const Export& wanted, Streams streams) {
   DataFile file;
   if (const std::string error = file.Open(wanted.in); !error.empty()) return Refuse(streams, error);
@@ -61,6 +66,26 @@ int ExportCommand(const Export& wanted, Streams streams) {
   if (!written.Ok()) return Refuse(streams, written.error);
   if (!written.note.empty()) fmt::print(streams.err, "{}: {}\n", wanted.out, written.note);
   return kDone;
+}
+
+}  // namespace
+
+void OfferExportCommand(CommandOffers& offers) {
+  auto options = std::make_shared<Export>();
+  CLI::App* exporting = offers.Command("export", "Write time series (.nds0) as a table (CSV), or a grid as GeoTIFF",
+                                       [offers, options] { return ExportCommand(*options, offers.Output()); });
+  exporting->add_option("FILE", options->in, "The data file")->required();
+  exporting->add_option("OUT", options->out, "The file to write: a GeoTIFF when it ends in .tif, else a table")
+      ->required();
+  for (const auto& [name, number, description] :
+       {std::tuple{"--item", &options->item, "The item of a grid, from 1; the first without it"},
+        std::tuple{"--step", &options->step, "Its time step, from 1; the first without it"},
+        std::tuple{"--layer", &options->layer, "Its layer, from 1 at the bottom; the lowest without it"}}) {
+    exporting->add_option(name, *number, description)->check(CLI::PositiveNumber)->each([options](const std::string&) {
+      options->isPartNamed = true;
+    });
+  }
+  exporting->add_flag("--force", options->force, "Replace a file that exists");
 }
 
 }  // namespace tervane

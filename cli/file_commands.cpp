@@ -3,25 +3,11 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "platform/files.h"
 
 namespace tervane {
-
-namespace {
-
-int Save(CFlowModelDoc& document, const std::string& file, Streams streams) {
-  if (!document.OnSaveDocument(file)) {
-    fmt::print(streams.err, "{}\n", document.Error());
-    return kCouldNot;
-  }
-  for (const std::string& note : document.SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
-  return kDone;
-}
-
-}  // namespace
 
 int Refuse(Streams streams, const std::string& reason) {
   fmt::print(streams.err, "{}\n", reason);
@@ -33,6 +19,22 @@ bool RefuseToReplace(const std::string& file, bool force, Streams streams) {
   if (force || !FileExists(file)) return false;
   fmt::print(streams.err, "{} exists; choose another name, or add --force to replace it\n", file);
   return true;
+}
+
+namespace {
+
+struct FileOptions {
+  std::string file, in;
+  bool force = false;
+};
+
+int Save(CFlowModelDoc& document, const std::string& file, Streams streams) {
+  if (!document.OnSaveDocument(file)) {
+    fmt::print(streams.err, "{}\n", document.Error());
+    return kCouldNot;
+  }
+  for (const std::string& note : document.SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
+  return kDone;
 }
 
 int NewCommand(const std::string& file, bool force, Streams streams) {
@@ -49,6 +51,28 @@ int ConvertCommand(const std::string& in, const std::string& out, bool force, St
   if (isInPlace ? RefuseHeld(out, force, streams) : RefuseToReplace(out, force, streams)) return kCouldNot;
   TellReport(document, streams);
   return Save(document, out, streams);
+}
+
+}  // namespace
+
+void OfferFileCommands(CommandOffers& offers) {
+  auto options = std::make_shared<FileOptions>();
+  CLI::App* create = offers.Command("new", "Write a setup with all defaults", [offers, options] {
+    return NewCommand(options->file, options->force, offers.Output());
+  });
+  AddSetup(create, options->file);
+  create->add_flag("--force", options->force, "Replace a file that exists, also where an editor has it open");
+}
+
+void OfferConvertCommand(CommandOffers& offers) {
+  auto options = std::make_shared<FileOptions>();
+  CLI::App* convert = offers.Command(
+      "convert", "Write a setup of any version as one of the present version",
+      [offers, options] { return ConvertCommand(options->in, options->file, options->force, offers.Output()); });
+  convert->add_option("IN", options->in, "The setup to read")->required();
+  convert->add_option("OUT", options->file, "The setup to write; when it is IN, the original is kept beside it")
+      ->required();
+  convert->add_flag("--force", options->force, "Replace another file that exists, also where an editor has it open");
 }
 
 }  // namespace tervane

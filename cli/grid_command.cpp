@@ -3,8 +3,7 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "data/grid_files.h"
 #include "data/raster_import.h"
@@ -13,6 +12,17 @@
 namespace tervane {
 
 namespace {
+
+/// What makes a data file of a band of a raster.
+struct GridImport {
+  std::string in, out;
+  int itemType = 0;
+  int band = 0;  ///< 0: the only one.
+  std::string unit;
+  std::string like;                      ///< A setup, on whose model grid the values are put.
+  std::optional<Resampling> resampling;  ///< Without one what suits.
+  bool force = false;
+};
 
 /// The model grid of a setup; false, with a message, when it has none: the grid that stands in for a missing file is
 /// none to put values on.
@@ -27,8 +37,6 @@ bool FindModelGrid(const std::string& setup, GridGeometry& geometry, Streams str
   if (!result.Ok()) Refuse(streams, fmt::format("{}: the model domain: {}", setup, result.error));
   return result.Ok();
 }
-
-}  // namespace
 
 int ImportGridCommand(const GridImport& import, Streams streams) {
   RasterImport wanted;
@@ -56,6 +64,36 @@ int ImportGridCommand(const GridImport& import, Streams streams) {
     fmt::print(streams.out, "on the model grid of {}: {}\n", import.like, ResamplingText(report.resampling));
   }
   return kDone;
+}
+
+}  // namespace
+
+void OfferGridImport(CommandOffers& offers, CLI::App* family) {
+  auto options = std::make_shared<GridImport>();
+  CLI::App* gridding = offers.Command(
+      "grid", "Make a grid (.nds2) of a band of a raster (GeoTIFF, ASCII grid, ...)",
+      [offers, options] { return ImportGridCommand(*options, offers.Output()); }, family);
+  gridding->footer(
+      "UNITS. The values are in the unit of --unit, without it in the one that the raster names, without that in the\n"
+      "item type's base unit. A unit that the item type has is kept with the values as they are; values in any other\n"
+      "unit (feet for an elevation, say) are converted to the base unit.\n"
+      "PLACE. Without --like the grid has the raster's own cells. With it a cell takes: the raster's value, where the\n"
+      "cells agree; codes (item type 100370, or 999 with whole numbers of at most 100 values) from the nearest cell;\n"
+      "else the average of the raster's cells in it, where two or more go across, or the bilinear value between them.\n"
+      "Where both projections are known and differ, places are converted.");
+  gridding->add_option("RASTER", options->in, "The raster, of any kind that GDAL reads")->required();
+  gridding->add_option("OUT", options->out, "The data file to write")->required();
+  AddQuantity(gridding, options->itemType)->required();
+  gridding->add_option("--unit", options->unit, "The unit of the raster's values; see UNITS");
+  gridding->add_option("--band", options->band, "The number of the band, from 1; not needed where there is only one")
+      ->check(CLI::PositiveNumber);
+  gridding->add_option("--like", options->like, "A setup (.tvd), on whose model grid the values are put; see PLACE");
+  const std::map<std::string, Resampling> methods{
+      {"nearest", Resampling::Nearest}, {"bilinear", Resampling::Bilinear}, {"average", Resampling::Average}};
+  gridding->add_option("--resample", options->resampling, "How, with --like, instead of what PLACE tells")
+      ->transform(CLI::CheckedTransformer(methods))
+      ->needs("--like");
+  gridding->add_flag("--force", options->force, "Replace a file that exists");
 }
 
 }  // namespace tervane

@@ -3,8 +3,7 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
+#include "cli/offers.h"
 #include "core/doc_version.h"
 #include "core/list.h"
 #include "document/key_reference.h"
@@ -40,8 +39,6 @@ void WriteText(const KeySection& section, std::ostream& out) {
     fmt::print(out, "{}:{}\t{}\t{}\t{}\n", section.path, Trimmed(key.key), key.type, key.defaultValue, Versions(key));
 }
 
-}  // namespace
-
 int KeysCommand(bool markdown, Streams streams) {
   const KeyReference reference;
   if (markdown)
@@ -54,6 +51,16 @@ int KeysCommand(bool markdown, Streams streams) {
   for (const KeySection& section : reference.Sections())
     markdown ? WriteMarkdown(section, streams.out) : WriteText(section, streams.out);
   return kDone;
+}
+
+}  // namespace
+
+void OfferKeysCommand(CommandOffers& offers) {
+  auto markdown = std::make_shared<bool>(false);
+  offers
+      .Command("keys", "List all keys with place, type and default",
+               [offers, markdown] { return KeysCommand(*markdown, offers.Output()); })
+      ->add_flag("--markdown", *markdown, "As a page of the manual");
 }
 
 }  // namespace tervane

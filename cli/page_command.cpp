@@ -3,13 +3,14 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "forms/page.h"
 #include "pages/tree_entries.h"
 
 namespace tervane {
+
+namespace {
 
 int PageCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;
@@ -27,6 +28,20 @@ int PageCommand(const std::string& file, const std::string& typed, Streams strea
   }
   fmt::print(streams.out, "{}", FormText(page->Form()));
   return kDone;
+}
+
+}  // namespace
+
+void OfferPageCommand(CommandOffers& offers) {
+  struct Options {
+    std::string file, path;
+  };
+  auto options = std::make_shared<Options>();
+  CLI::App* page = offers.Command("page", "Show the page of a node as text, control by control", [offers, options] {
+    return PageCommand(options->file, options->path, offers.Output());
+  });
+  AddSetup(page, options->file);
+  page->add_option("PATH", options->path, "The node")->required();
 }
 
 }  // namespace tervane

@@ -7,9 +7,8 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
 #include "cli/json.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "execution/engine_line.h"
 #include "execution/run_log.h"
@@ -19,6 +18,14 @@
 namespace tervane {
 
 namespace {
+
+/// What `run` was asked for.
+struct RunOptions {
+  std::string file;
+  std::string argument;  ///< "/PP", "/WM", "/WQ", or empty: what the setup says.
+  std::string engines;   ///< Folders of engines; may be empty.
+  bool json = false;
+};
 
 constexpr std::chrono::milliseconds kInterval{50};
 constexpr std::size_t kBlock = 256u << 10;
@@ -128,8 +135,6 @@ void TerminalShell::Tell(const SetupRun& run, const std::string& sentence) {
                          {"findings", JsonArray(findings)}}));
 }
 
-}  // namespace
-
 int RunCommand(const RunOptions& options, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, options.file, streams)) return kCouldNot;
@@ -137,6 +142,29 @@ int RunCommand(const RunOptions& options, Streams streams) {
   document.SetEngineShell(&shell);
   document.RunEngine(options.argument);
   return shell.Status();
+}
+
+}  // namespace
+
+void OfferRunCommand(CommandOffers& offers) {
+  auto options = std::make_shared<RunOptions>();
+  CLI::App* runs = offers.Command("run", "Run a setup with its engine and wait for the end",
+                                  [offers, options] { return RunCommand(*options, offers.Output()); });
+  AddSetup(runs, options->file);
+  runs->footer(
+      "What the engine says goes to the output, how it ended to the error stream. Ctrl-C stops the engine. Exit "
+      "status:\n"
+      "0 done, 1 the engine failed or was stopped, 2 not started.");
+  const auto part = [&](const char* name, const char* argument, const char* description) {
+    return runs->add_flag_callback(
+        name, [options, argument] { options->argument = argument; }, description);
+  };
+  CLI::Option* preprocessor = part("--pp", "/PP", "The preprocessor alone, whatever the setup says");
+  CLI::Option* waterMovement = part("--wm", "/WM", "Water movement alone")->excludes(preprocessor);
+  part("--wq", "/WQ", "Water quality alone")->excludes(preprocessor)->excludes(waterMovement);
+  runs->add_option("--engines", options->engines,
+                   "The folder of the engines; without it TERVANE_ENGINES, or engines/ beside the program");
+  runs->add_flag("--json", options->json, "How it ended as JSON; what the engine says goes to the error stream");
 }
 
 }  // namespace tervane

@@ -6,8 +6,7 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
+#include "cli/offers.h"
 #include "data/datafile_request.h"
 #include "data/datafile_writer.h"
 #include "data/import_unit.h"
@@ -17,6 +16,18 @@
 namespace tervane {
 
 namespace {
+
+/// What makes a data file of columns of a table.
+struct SeriesImport {
+  std::string in, out;
+  int itemType = 0;
+  std::vector<std::string> columns;  ///< None: the only one.
+  bool isEveryColumn = false;
+  std::string unit;
+  int valueType = 0;
+  bool stampsAreBegins = false;
+  bool force = false;
+};
 
 /// Moves stamps from the begins of their intervals to the ends; the last interval is as long as the one before.
 void MoveToEnds(std::vector<CYbDateTime>& stamps) {
@@ -63,8 +74,6 @@ std::string Write(const std::string& path, const NewDataFile& content, const Col
   return result.error;
 }
 
-}  // namespace
-
 int ImportSeriesCommand(const SeriesImport& import, Streams streams) {
   const ItemType* type = FindItemType(import.itemType);
   if (type == nullptr) return Refuse(streams, fmt::format("there is no item type {}", import.itemType));
@@ -95,6 +104,33 @@ int ImportSeriesCommand(const SeriesImport& import, Streams streams) {
              columns.items.size() > 1 ? fmt::format("{} items, ", columns.items.size()) : std::string(), stamps.size(),
              type->name, DateInWords(stamps.front()), DateInWords(stamps.back()));
   return kDone;
+}
+
+}  // namespace
+
+void OfferSeriesImport(CommandOffers& offers, CLI::App* family) {
+  auto options = std::make_shared<SeriesImport>();
+  CLI::App* series = offers.Command(
+      "series", "Make time series (.nds0) of columns of a table (CSV)",
+      [offers, options] { return ImportSeriesCommand(*options, offers.Output()); }, family);
+  series->add_option("CSV", options->in, "The table: names in its first line, ISO dates in its first column")
+      ->required();
+  series->add_option("OUT", options->out, "The data file to write")->required();
+  AddQuantity(series, options->itemType)->required();
+  CLI::Option* column = series->add_option("--column", options->columns,
+                                           "The name of the column; not needed where there is only one. Given several "
+                                           "times, each makes an item");
+  column->allow_extra_args(false);
+  series->add_flag("--all-columns", options->isEveryColumn, "An item of each column")->excludes(column);
+  series->add_option("--unit", options->unit, "The unit of the values; the item type's base unit without it");
+  const std::map<std::string, int> valueTypes{
+      {"instantaneous", 0}, {"accumulated", 1}, {"step-accumulated", 2}, {"mean-step", 3}};
+  series->add_option("--value-type", options->valueType, "How a value belongs to its stamp")
+      ->transform(CLI::CheckedTransformer(valueTypes));
+  const std::map<std::string, bool> stampPlaces{{"begin", true}, {"end", false}};
+  series->add_option("--stamps", options->stampsAreBegins, "Which end of its interval a stamp is; end without it")
+      ->transform(CLI::CheckedTransformer(stampPlaces));
+  series->add_flag("--force", options->force, "Replace a file that exists");
 }
 
 }  // namespace tervane

@@ -3,15 +3,23 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
 #include "cli/json.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "core/kvf_writer.h"
 #include "core/list.h"
 #include "document/key_reference.h"
 
 namespace tervane {
+
+namespace {
+
+enum class TreeForm { Text, Paths, Json };
+
+struct TreeOptions {
+  std::string file, path;
+  bool all = false, paths = false, json = false;
+};
 
 int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams) {
   CFlowModelDoc document;
@@ -41,8 +49,6 @@ int TreeCommand(const std::string& file, bool all, TreeForm form, Streams stream
   return kDone;
 }
 
-namespace {
-
 /// The node's keys as they would be saved, with their defaults where they differ, and its findings.
 void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyReference& reference, Streams streams) {
   fmt::print(streams.out, "{}  {} ({}){}\n", place.path, place.node.GetTitle(), ClassNameOf(place.node),
@@ -59,8 +65,6 @@ void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyRefe
   }
 }
 
-}  // namespace
-
 int ShowCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
@@ -76,6 +80,26 @@ int ShowCommand(const std::string& file, const std::string& typed, Streams strea
       if (node == wanted) return ShowNode(place, written, reference, streams);
   });
   return kDone;
+}
+
+}  // namespace
+
+void OfferTreeCommands(CommandOffers& offers) {
+  auto options = std::make_shared<TreeOptions>();
+  CLI::App* tree = offers.Command("tree", "List the nodes that take part", [offers, options] {
+    const TreeForm form = options->json ? TreeForm::Json : options->paths ? TreeForm::Paths : TreeForm::Text;
+    return TreeCommand(options->file, options->all, form, offers.Output());
+  });
+  AddSetup(tree, options->file);
+  tree->add_flag("--all", options->all, "Also the nodes that take no part");
+  tree->add_flag("--paths", options->paths, "One PATH a line");
+  tree->add_flag("--json", options->json, "As JSON");
+
+  CLI::App* show = offers.Command("show", "Show nodes with their keys, as they would be saved", [offers, options] {
+    return ShowCommand(options->file, options->path, offers.Output());
+  });
+  AddSetup(show, options->file);
+  show->add_option("PATH", options->path, "The node; without it the whole setup");
 }
 
 }  // namespace tervane

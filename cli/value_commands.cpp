@@ -7,8 +7,7 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "core/kvf_writer.h"
 #include "platform/text.h"
@@ -31,6 +30,11 @@ int GetCommand(const std::string& file, const std::string& typed, Streams stream
 }
 
 namespace {
+
+struct ValueOptions {
+  std::string file, path, value;
+  bool force = false;
+};
 
 template <class Number>
 bool ReadNumber(std::string_view text, Number& number) {
@@ -81,8 +85,6 @@ std::string TakeValues(std::string_view value, KvfFile& file, KvfNode& key) {
   return {};
 }
 
-}  // namespace
-
 int SetCommand(const std::string& file, const std::string& typed, const std::string& value, bool force,
                Streams streams) {
   if (RefuseHeld(file, force, streams)) return kCouldNot;
@@ -128,6 +130,25 @@ int SetCommand(const std::string& file, const std::string& typed, const std::str
   }
   for (const std::string& note : changed.SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
   return kDone;
+}
+
+}  // namespace
+
+void OfferValueCommands(CommandOffers& offers) {
+  auto options = std::make_shared<ValueOptions>();
+  CLI::App* get = offers.Command("get", "Print the value of a key, as it would be saved", [offers, options] {
+    return GetCommand(options->file, options->path, offers.Output());
+  });
+  CLI::App* set = offers.Command("set", "Change the value of a key and save the setup", [offers, options] {
+    return SetCommand(options->file, options->path, options->value, options->force, offers.Output());
+  });
+  for (CLI::App* command : {get, set}) {
+    AddSetup(command, options->file);
+    command->add_option("PATH", options->path, "The key, as SECTION/SECTION:KEY")->required();
+  }
+  set->add_option("VALUE", options->value, "The value; several separated by commas; dates also as 2000-01-31 12:00")
+      ->required();
+  set->add_flag("--force", options->force, "Also where an editor has the setup open");
 }
 
 }  // namespace tervane

@@ -3,9 +3,8 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/command_line.h"
-#include "cli/commands.h"
 #include "cli/json.h"
+#include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "core/path.h"
 #include "pages/why.h"
@@ -13,6 +12,11 @@
 namespace tervane {
 
 namespace {
+
+struct WhyOptions {
+  std::string file, path;
+  bool json = false;
+};
 
 std::string Json(const Explanation& why, const std::string& path) {
   std::vector<std::string> reasons;
@@ -36,8 +40,6 @@ void Write(const Explanation& why, const std::string& path, Streams streams) {
                reason.path.empty() ? "" : fmt::format("  ({}:{})", reason.path, reason.key));
 }
 
-}  // namespace
-
 int WhyCommand(const std::string& file, const std::string& typed, bool json, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
@@ -56,6 +58,18 @@ int WhyCommand(const std::string& file, const std::string& typed, bool json, Str
     json ? objects.push_back(Json(node.why, node.path)) : Write(node.why, node.path, streams);
   if (json) fmt::print(streams.out, "{}\n", JsonObject({{"nodes", JsonArray(objects)}}));
   return kDone;
+}
+
+}  // namespace
+
+void OfferWhyCommand(CommandOffers& offers) {
+  auto options = std::make_shared<WhyOptions>();
+  CLI::App* why = offers.Command("why", "Tell why a node takes part or not", [offers, options] {
+    return WhyCommand(options->file, options->path, options->json, offers.Output());
+  });
+  AddSetup(why, options->file);
+  why->add_option("PATH", options->path, "The node; without it all that is missing, and what would bring it");
+  why->add_flag("--json", options->json, "As JSON");
 }
 
 }  // namespace tervane

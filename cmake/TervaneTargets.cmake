@@ -18,6 +18,7 @@ target_compile_options(tervane_warnings INTERFACE
 # target of that kind. A source still includes what it uses.
 set(TERVANE_HEADERS_core <algorithm> <cmath> <functional> <map> <memory> <optional> <string> <string_view>
   <unordered_map> <vector> <fmt/format.h>)
+set(TERVANE_HEADERS_commands ${TERVANE_HEADERS_core} <CLI/CLI.hpp>)
 set(TERVANE_HEADERS_desktop ${TERVANE_HEADERS_core} <QBoxLayout> <QLabel> <QPainter> <QString> <QToolButton> <QWidget>)
 set(TERVANE_HEADERS_test ${TERVANE_HEADERS_core} <gmock/gmock.h> <gtest/gtest.h>)
 function(tervane_precompile target kind)
@@ -30,11 +31,11 @@ function(tervane_precompile target kind)
   endif()
 endfunction()
 
-# tervane_library([DESKTOP] LINKS ...): the folder as a library of the folder's name, `tervane_pages_spatial` for
+# tervane_library([DESKTOP|COMMANDS] LINKS ...): the folder as a library of the folder's name, `tervane_pages_spatial` for
 # pages/spatial, without a main.cpp. LINKS are public: who links a floor sees the floors below it. DESKTOP is said where
-# the toolkit is used.
+# the toolkit is used, COMMANDS where options are parsed.
 function(tervane_library)
-  cmake_parse_arguments(ARG "DESKTOP" "" "LINKS" ${ARGN})
+  cmake_parse_arguments(ARG "DESKTOP;COMMANDS" "" "LINKS" ${ARGN})
   file(RELATIVE_PATH folder ${PROJECT_SOURCE_DIR} ${CMAKE_CURRENT_SOURCE_DIR})
   string(REPLACE "/" "_" name tervane_${folder})
   file(GLOB sources CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*.cpp)
@@ -45,6 +46,8 @@ function(tervane_library)
   if(ARG_DESKTOP)
     set_target_properties(${name} PROPERTIES AUTOMOC ON)
     tervane_precompile(${name} desktop)
+  elseif(ARG_COMMANDS)
+    tervane_precompile(${name} commands)
   else()
     tervane_precompile(${name} core)
   endif()

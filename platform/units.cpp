@@ -292,6 +292,13 @@ const ItemType* FindItemType(int code) {
   return found != AllItemTypes().end() && found->code == code ? &*found : nullptr;
 }
 
+const ItemType* FindItemType(std::string_view codeOrName) {
+  const std::string name = LowerCase(Trimmed(codeOrName));
+  for (const ItemType& type : AllItemTypes())
+    if (LowerCase(type.name) == name || std::to_string(type.code) == name) return &type;
+  return nullptr;
+}
+
 const Unit* FindUnit(int key) {
   const auto found = std::ranges::lower_bound(AllUnits(), key, {}, &Unit::key);
   return found != AllUnits().end() && found->key == key ? &*found : nullptr;

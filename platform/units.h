@@ -94,6 +94,8 @@ std::span<const Unit> AllUnits();
 
 /// Null when the code or key is unknown.
 const ItemType* FindItemType(int code);
+/// The quantity of that code or name, "100431" or "precipitation rate", as people type it; null when there is none.
+const ItemType* FindItemType(std::string_view codeOrName);
 const Unit* FindUnit(int key);
 
 const Unit& BaseUnit(const ItemType& itemType);

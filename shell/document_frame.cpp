@@ -227,8 +227,8 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
     page_->deleteLater();
   }
   page_ = new PageView(std::move(made), ToQt(PathOf(node)));
-  connect(page_, &PageView::WhyAsked, this, [this](const Control* control) {
-    ShowWhy(tr("Why Is This Grey?"), {WhyEnabled(session_->Document(), page_->Page().Form(), *control)},
+  connect(page_, &PageView::WhyAsked, this, [this](const Control* asked) {
+    ShowWhy(tr("Why Is This Grey?"), {WhyEnabled(session_->Document(), page_->Page().Form(), *asked)},
             tr("can be changed, since"), tr("cannot be changed, since"));
   });
   connect(page_, &PageView::UnitChosen, this, [this](int itemType, int unit) {

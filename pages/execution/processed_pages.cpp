@@ -173,7 +173,7 @@ void CPreprocessedNDS3_PLOTDlg::Describe(PageForm& form) {
       .Hint(kViewOnly);
   form.Button("Edit...", [this] { EditDataFile(Context(), Node(), FileName(Node().GetFile(), {}), Item()); })
       .ToolTip("Use grid editor to view preprocessed grid data");
-  const auto areLayers = [this] { return areElevations_ && layers_ > 0; };
+  const Condition areLayers = Sentence("the file has layers", [this] { return areElevations_ && layers_ > 0; });
   section_.DescribeButtons(form, areLayers);
   form.Map([this] { return Map(); });
   section_.DescribeSection(

@@ -14,7 +14,7 @@ constexpr unsigned kLineColor = 0xe03c31;
 
 SectionTool::SectionTool(std::function<void()> shown) : shown_(shown), question_(std::move(shown)) {}
 
-void SectionTool::DescribeButtons(PageForm& form, std::function<bool()> isOffered) {
+void SectionTool::DescribeButtons(PageForm& form, const Condition& isOffered) {
   form.Button("Draw Section",
               [this] {
                 question_.AskLine("Click the points of the section. A double click ends it, Esc gives up.",
@@ -32,18 +32,17 @@ void SectionTool::DescribeButtons(PageForm& form, std::function<bool()> isOffere
                 if (shown_) shown_();
               })
       .Beside()
-      .EnabledWhen([this] { return drawn_ != nullptr; })
-      .ShownWhen(std::move(isOffered));
+      .EnabledWhen("a section is drawn", [this] { return drawn_ != nullptr; })
+      .ShownWhen(isOffered);
 }
 
-void SectionTool::DescribeSection(PageForm& form, std::function<SectionContent()> content,
-                                  std::function<bool()> isOffered) {
+void SectionTool::DescribeSection(PageForm& form, std::function<SectionContent()> content, const Condition& isOffered) {
   form.Section([this, content = std::move(content)] {
         SectionContent section = content();
         section.line = line_;
         return section;
       })
-      .ShownWhen([this, isOffered = std::move(isOffered)] { return drawn_ && isOffered(); });
+      .ShownWhen(Sentence("a section is drawn", [this] { return drawn_ != nullptr; }) && isOffered);
 }
 
 void SectionTool::PutOn(MapContent& map) const {

@@ -18,9 +18,9 @@ class SectionTool {
   explicit SectionTool(std::function<void()> shown);
 
   /// Adds the buttons that draw and remove a line; `isOffered` says whether there is something to cut.
-  void DescribeButtons(PageForm& form, std::function<bool()> isOffered);
+  void DescribeButtons(PageForm& form, const Condition& isOffered);
   /// Adds the section, which is shown once there is a line; `content` gives its surfaces, and the tool the line.
-  void DescribeSection(PageForm& form, std::function<SectionContent()> content, std::function<bool()> isOffered);
+  void DescribeSection(PageForm& form, std::function<SectionContent()> content, const Condition& isOffered);
   /// Puts the line on the page's map, and the question for it.
   void PutOn(MapContent& map) const;
 

@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <QHBoxLayout>
 
+#include <qcustomplot.h>
+
 #include "forms/plots.h"
 #include "shell/charts/section_view.h"
 #include "shell/charts/series_plot.h"

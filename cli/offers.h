@@ -1,0 +1,74 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// How a file of commands offers them: a function over the command line, and a row in `kFiles` of command_line.cpp.
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <string>
+
+#include <CLI/CLI.hpp>
+
+#include "cli/command_line.h"
+#include "cli/commands.h"
+
+namespace tervane {
+
+/// The command line while its commands are being offered. What a command writes its options into is shared by the
+/// functions that are handed over, and lives as long as they do.
+class CommandOffers {
+ public:
+  CommandOffers(CLI::App& app, Streams streams, int& status) : app_(app), streams_(streams), status_(status) {}
+
+  Streams Output() const { return streams_; }
+  /// The whole, for the completion.
+  const CLI::App& Whole() const { return app_; }
+
+  /// A command, or with `parent` one of several under its name; `run` gives an `ExitStatus`.
+  CLI::App* Command(const char* name, const char* description, std::function<int()> run, CLI::App* parent = nullptr) {
+    CLI::App* command = (parent ? parent : &app_)->add_subcommand(name, description);
+    command->callback([&status = status_, run = std::move(run)] { status = run(); });
+    return command;
+  }
+  /// A name under which several commands stand.
+  CLI::App* Family(const char* name, const char* description) {
+    CLI::App* family = app_.add_subcommand(name, description);
+    family->require_subcommand(1);
+    return family;
+  }
+
+ private:
+  CLI::App& app_;
+  Streams streams_;
+  int& status_;
+};
+
+// Options that several commands have, told once.
+
+inline void AddSetup(CLI::App* command, std::string& file) {
+  command->add_option("FILE", file, "The setup (.tvd)")->required();
+}
+/// A quantity by its code or its name, in any case; an unknown one is refused with those that come near.
+CLI::Option* AddQuantity(CLI::App* command, int& itemType);
+
+// The files of commands, in the order of the help.
+
+void OfferFileCommands(CommandOffers& offers);
+void OfferConvertCommand(CommandOffers& offers);
+void OfferCheckCommand(CommandOffers& offers);
+void OfferTreeCommands(CommandOffers& offers);
+void OfferWhyCommand(CommandOffers& offers);
+void OfferPageCommand(CommandOffers& offers);
+void OfferValueCommands(CommandOffers& offers);
+void OfferDiffCommand(CommandOffers& offers);
+void OfferKeysCommand(CommandOffers& offers);
+void OfferRunCommand(CommandOffers& offers);
+void OfferDataCommands(CommandOffers& offers);
+/// Below the family `import`.
+void OfferSeriesImport(CommandOffers& offers, CLI::App* family);
+void OfferGridImport(CommandOffers& offers, CLI::App* family);
+void OfferExportCommand(CommandOffers& offers);
+void OfferCompletion(CommandOffers& offers);
+
+}  // namespace tervane
