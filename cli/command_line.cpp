@@ -45,8 +45,9 @@ CLI::Option* AddQuantity(CLI::App* command, int& itemType) {
       [&itemType](const std::string& typed) {
         const ItemType* type = FindItemType(typed);
         if (!type)
-          throw CLI::ValidationError("--item", fmt::format("there is no quantity {}: a code or a name was expected, {}",
-                                                           typed, NearQuantities(typed)));
+          throw CLI::ValidationError(
+              "--item",
+              fmt::format("there is no item type {}: a code or a name was expected, {}", typed, NearQuantities(typed)));
         itemType = type->code;
       },
       "The quantity, by its code or name: 100431, \"Precipitation Rate\"");

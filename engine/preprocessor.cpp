@@ -106,7 +106,7 @@ bool Preprocessor::CheckSetup() {
     if (!place.takesPart) return;
     // A period that is not covered is a warning to who edits, and an end to who computes.
     const auto* file = dynamic_cast<const DataFileNode*>(&place.node);
-    const bool isNeeded = file && file->FileUsed;
+    const bool isNeeded = file && file->IsFileUsed();
     const std::string problem =
         isNeeded ? WhyNotMet(file->File.Absolute(), file->Items, file->SelectionRequest()) : std::string();
     if (!problem.empty()) return log_.Error(place.path + ":FILE_NAME", problem);

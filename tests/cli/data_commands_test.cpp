@@ -82,8 +82,8 @@ TEST(DataCommands, ASeriesGoesFromATableToADataFileAndBack) {
   const std::string csv =
       folder.Write("in.csv", "time;Flow;Rain\n2000-02-28;1,5;0.1\n2000-02-29;;2\n2000-03-01 00:00;0.25;3\n");
   const std::string series = folder.File("a.nds0"), back = folder.File("back.csv");
-  const Outcome imported = Tervane({"import", "series", csv, series, "--item", "100182", "--column", "flow", "--unit",
-                                    "mm/h", "--value-type", "mean-step", "--stamps", "begin"});
+  const Outcome imported = Tervane({"import", "series", csv, series, "--item", "evapotranspiration", "--column", "flow",
+                                    "--unit", "mm/h", "--value-type", "mean-step", "--stamps", "begin"});
   EXPECT_EQ(imported.status, kDone) << imported.err;
   EXPECT_THAT(imported.err, HasSubstr("note: 1 missing value in line 3"));
   EXPECT_THAT(imported.out, HasSubstr("3 steps of Evapotranspiration from 2000-02-29 to 2000-03-02"));

@@ -84,7 +84,7 @@ class RunSetup {
 TEST(ProcessedPages, EveryPageShowsWhatItsStoredTextShows) {
   RunSetup run;
   const std::string text = run.AllPages();
-  const fs::path stored = fs::path(TERVANE_SOURCE_DIR) / "tests/pages/processed_data.txt";
+  const fs::path stored = fs::path(TERVANE_SOURCE_DIR) / "tests/pages/execution/processed_data.txt";
   if (std::getenv("TERVANE_STORE_PAGES")) std::ofstream(stored, std::ios::binary) << text;
   EXPECT_EQ(test::ReadFile(stored.string()), text);
   EXPECT_THAT(run.Host().told, ElementsAre());
