@@ -38,7 +38,10 @@ void SectionTool::DescribeButtons(PageForm& form, const Condition& isOffered) {
 
 void SectionTool::DescribeSection(PageForm& form, std::function<SectionContent()> content, const Condition& isOffered) {
   form.Section([this, content = std::move(content)] {
-        SectionContent section = content();
+        SectionContent section;
+        section.message = "Draw a section on the map.";
+        if (!drawn_) return section;
+        section = content();
         section.line = line_;
         return section;
       })

@@ -13,6 +13,10 @@
 
 #include <qcustomplot.h>
 
+#include "shell/charts/chart_axis.h"
+#include "shell/charts/chart_markers.h"
+#include "shell/charts/chart_panels.h"
+#include "shell/charts/chart_style.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -20,58 +24,27 @@ namespace tervane {
 
 namespace {
 
-constexpr double kDay = 86400;
 constexpr double kZoomStep = 1.5;
 constexpr const char* kPointerLayer = "pointer";
-
-QDateTime AsDate(double seconds) {
-  return QDateTime::fromMSecsSinceEpoch(static_cast<qint64>(std::llround(seconds * 1000)), Qt::UTC);
-}
-
-/// Ticks at whole hours, days, months and years, each labelled as finely as it stands.
-class DateTicker : public QCPAxisTickerDateTime {
- public:
-  DateTicker() { setDateTimeSpec(Qt::UTC); }
-
- protected:
-  double getTickStep(const QCPRange& range) override {
-    isFirst_ = std::floor(range.lower / kDay) == std::floor(range.upper / kDay);
-    return step_ = QCPAxisTickerDateTime::getTickStep(range);
-  }
-  QString getTickLabel(double tick, const QLocale& /*locale*/, QChar /*formatChar*/, int /*precision*/) override {
-    const QDateTime date = AsDate(tick);
-    if (step_ > 360 * kDay) return date.toString("yyyy");
-    if (step_ > 27 * kDay) return date.toString("yyyy/MM");
-    if (step_ > 0.99 * kDay) return date.toString("yyyy/MM/dd");
-    const QString time = date.toString(step_ > 59 ? "HH:mm" : "HH:mm:ss");
-    // The day is told where it begins, and once where no day begins.
-    const bool isFirst = std::exchange(isFirst_, false);
-    return date.time() == QTime(0, 0) || isFirst ? time + "\n" + date.toString("yyyy/MM/dd") : time;
-  }
-
- private:
-  double step_ = kDay;
-  bool isFirst_ = false;
-};
-
-/// Colours of curves that are told apart on white and on dark ground, also by people who confuse red and green.
-QColor CurveColor(std::size_t number, bool onDark) {
-  constexpr std::array<std::pair<QRgb, QRgb>, 8> kColors{{{0xff1f6fb2, 0xff62aef0},
-                                                          {0xffd1601a, 0xffff9b54},
-                                                          {0xff2b8a4b, 0xff62c987},
-                                                          {0xffa63a78, 0xffe58abf},
-                                                          {0xff7a5c16, 0xffd9b64a},
-                                                          {0xff5b50b5, 0xffa79df5},
-                                                          {0xff128a91, 0xff4fd0d6},
-                                                          {0xff555c66, 0xffb9c0ca}}};
-  const auto& [light, dark] = kColors[number % kColors.size()];
-  return onDark ? dark : light;
-}
 
 QString NameOf(const Series& series) {
   QString name = ToQt(series.name);
   if (!series.unit.empty()) name += " [" + ToQt(series.unit) + "]";
   return name;
+}
+
+QString DateText(double seconds) {
+  return ToQt(CYbDateTime::FromSecondsSinceEpoch(std::llround(seconds)).Format("%Y-%m-%d %H:%M:%S"));
+}
+
+std::size_t PlaceCount(const Series& series) {
+  return series.positions.empty() ? series.times.size() : series.positions.size();
+}
+
+/// On the horizontal axis; NaN where a value has no place.
+double PlaceOfValue(const Series& series, std::size_t number) {
+  if (!series.positions.empty()) return series.positions[number];
+  return series.times[number].IsValid() ? PlaceOf(series.times[number]) : std::nan("");
 }
 
 QString ValueText(double value) { return std::isnan(value) ? QString() : ToQt(FormatNumber(value, "%.6g")); }
@@ -92,18 +65,11 @@ SeriesPlot::SeriesPlot(Host& host, QWidget* parent)
   chart_->setSelectionRectMode(QCP::srmNone);
   // Many values: lines of one pixel are drawn without the slow joins.
   chart_->setPlottingHint(QCP::phFastPolylines);
-  chart_->xAxis->setTicker(QSharedPointer<DateTicker>::create());
   chart_->addLayer(kPointerLayer, chart_->layer("overlay"), QCustomPlot::limBelow);
   chart_->layer(kPointerLayer)->setMode(QCPLayer::lmBuffered);
-  // The legend stands above the curves, where it hides nothing.
-  chart_->plotLayout()->insertRow(0);
-  auto* names = new QCPLayoutGrid;
-  chart_->plotLayout()->addElement(0, 0, names);
-  names->addElement(0, 0, chart_->legend);
-  names->addElement(0, 1, new QCPLayoutElement(chart_));
-  names->setColumnStretchFactor(0, 0.001);
-  chart_->plotLayout()->setRowStretchFactor(0, 0.001);
-  chart_->legend->setFillOrder(QCPLegend::foColumnsFirst);
+  PutLegendAbove(*chart_);
+  panels_ = new ChartPanels(*chart_, 1);
+  markers_ = new ChartMarkers(*chart_);
   connect(chart_, &QCustomPlot::beforeReplot, this, &SeriesPlot::Arrange);
   message_->setAlignment(Qt::AlignCenter);
   message_->setWordWrap(true);
@@ -118,7 +84,7 @@ SeriesPlot::SeriesPlot(Host& host, QWidget* parent)
   });
   connect(chart_, &QCustomPlot::mouseWheel, this, [this](const QWheelEvent* event) {
     const bool isValues = event->modifiers() & Qt::ControlModifier;
-    chart_->axisRect()->setRangeZoom(isValues ? Qt::Vertical : Qt::Horizontal);
+    for (QCPAxisRect* rect : panels_->Rects()) rect->setRangeZoom(isValues ? Qt::Vertical : Qt::Horizontal);
   });
   connect(chart_, &QCustomPlot::mouseMove, this, &SeriesPlot::PointAt);
   connect(chart_, &QCustomPlot::mouseDoubleClick, this, &SeriesPlot::Fit);
@@ -133,10 +99,15 @@ SeriesPlot::~SeriesPlot() = default;
 QWidget* SeriesPlot::FocusTarget() const { return chart_; }
 
 void SeriesPlot::Show(SeriesContent content) {
-  if (isShown_ && LooksSame(content, content_)) return;
-  isShown_ = true;
-  content_ = std::move(content);
-  Build();
+  std::optional<DateRequest> request = std::exchange(content.request, {});
+  if (isShown_ && LooksSame(content, content_)) {
+    markers_->SetMoves(content.markers);
+  } else {
+    isShown_ = true;
+    content_ = std::move(content);
+    Build();
+  }
+  markers_->Ask(content_.IsEmpty() ? std::nullopt : std::move(request));
 }
 
 void SeriesPlot::ShowWhenThere(const std::function<SeriesContent()>& content) {
@@ -152,59 +123,73 @@ void SeriesPlot::Build() {
   chart_->clearPlottables();
   chart_->clearItems();
   curves_.clear();
-  period_ = nullptr;
-  pointer_ = nullptr;
-  const bool isEmpty = content_.IsEmpty();
-  // The first two units have an axis each; with more, all numbers stand on one, and the legend tells their units.
-  std::vector<std::string> units;
-  for (const Series& series : content_.series)
-    if (std::ranges::find(units, series.unit) == units.end()) units.push_back(series.unit);
-  const bool hasSecond = units.size() == 2;
-  for (const Series& series : content_.series)
-    AddCurve(series, hasSecond && series.unit == units[1] ? chart_->yAxis2 : chart_->yAxis);
-  chart_->yAxis->setLabel(units.size() == 1 || hasSecond ? ToQt(units[0]) : QString());
-  chart_->yAxis2->setLabel(hasSecond ? ToQt(units[1]) : QString());
-  chart_->yAxis2->setVisible(true);
-  chart_->yAxis2->setTickLabels(hasSecond);
-  chart_->yAxis2->setTicks(hasSecond);
-  chart_->xAxis2->setVisible(true);
-  chart_->xAxis2->setTicks(false);
-  chart_->xAxis2->setTickLabels(false);
-  chart_->axisRect()->setRangeDragAxes({chart_->xAxis, chart_->yAxis, chart_->yAxis2});
-  chart_->axisRect()->setRangeZoomAxes({chart_->xAxis, chart_->yAxis, chart_->yAxis2});
-
+  periods_.clear();
+  pointers_.clear();
+  int panels = 1;
+  for (const Series& series : content_.series) panels = std::max(panels, series.panel + 1);
+  panels_->SetUp(panels, content_.numbers);
+  for (int panel = 0; panel < panels; ++panel) BuildPanel(panel);
   message_->setText(content_.message.empty() ? tr("There is nothing to show.") : Translated(content_.message));
-  message_->setVisible(isEmpty);
-  if (!isEmpty) {
-    if (content_.period && content_.period->first.IsValid() && content_.period->second.IsValid()) {
-      period_ = new QCPItemRect(chart_);
-      period_->setLayer("background");
-      for (QCPItemPosition* corner : {period_->topLeft, period_->bottomRight}) {
-        corner->setTypeX(QCPItemPosition::ptPlotCoords);
-        corner->setTypeY(QCPItemPosition::ptAxisRectRatio);
-      }
-      period_->topLeft->setCoords(static_cast<double>(content_.period->first.SecondsSinceEpoch()), 0);
-      period_->bottomRight->setCoords(static_cast<double>(content_.period->second.SecondsSinceEpoch()), 1);
-    }
-    pointer_ = new QCPItemStraightLine(chart_);
-    pointer_->setLayer(kPointerLayer);
-    pointer_->setVisible(false);
-  }
+  message_->setVisible(content_.IsEmpty());
+  markers_->Show(content_.IsEmpty() || content_.numbers ? std::vector<DateMarker>() : content_.markers,
+                 panels_->Rects());
   SetStatus({});
   ApplyTheme();
   Fit();
 }
 
-void SeriesPlot::AddCurve(const Series& series, QCPAxis* values) {
-  QCPGraph* graph = chart_->addGraph(chart_->xAxis, values);
+void SeriesPlot::BuildPanel(int panel) {
+  // The first two units have an axis each; with more, all numbers stand on one, and the legend tells their units.
+  std::vector<std::string> units;
+  for (const Series& series : content_.series)
+    if (series.panel == panel && std::ranges::find(units, series.unit) == units.end()) units.push_back(series.unit);
+  const bool hasSecond = units.size() == 2;
+  QCPAxis &keys = panels_->Keys(panel), &left = panels_->Values(panel, false), &right = panels_->Values(panel, true);
+  for (const Series& series : content_.series)
+    if (series.panel == panel) AddCurve(series, &keys, hasSecond && series.unit == units[1] ? &right : &left);
+  left.setLabel(units.size() == 1 || hasSecond ? ToQt(units[0]) : QString());
+  right.setLabel(hasSecond ? ToQt(units[1]) : QString());
+  right.setVisible(true);
+  right.setTickLabels(hasSecond);
+  right.setTicks(hasSecond);
+  if (content_.IsEmpty()) return;
+  const auto over = [&](QCPItemPosition* place) {
+    place->setAxes(&keys, &left);
+    place->setAxisRect(left.axisRect());
+    place->setTypeX(QCPItemPosition::ptPlotCoords);
+    place->setTypeY(QCPItemPosition::ptAxisRectRatio);
+  };
+  if (content_.period && !content_.numbers && content_.period->first.IsValid() && content_.period->second.IsValid()) {
+    auto* period = new QCPItemRect(chart_);
+    period->setLayer("background");
+    period->setClipAxisRect(left.axisRect());
+    over(period->topLeft);
+    over(period->bottomRight);
+    period->topLeft->setCoords(PlaceOf(content_.period->first), 0);
+    period->bottomRight->setCoords(PlaceOf(content_.period->second), 1);
+    periods_.push_back(period);
+  }
+  auto* pointer = new QCPItemStraightLine(chart_);
+  pointer->setLayer(kPointerLayer);
+  pointer->setVisible(false);
+  pointer->setClipAxisRect(left.axisRect());
+  over(pointer->point1);
+  over(pointer->point2);
+  pointers_.push_back(pointer);
+}
+
+void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) {
+  QCPGraph* graph = chart_->addGraph(keys, values);
   const auto shown = QSharedPointer<QCPGraphDataContainer>::create();
   QVector<QCPGraphData> points;
-  const std::size_t count = std::min(series.times.size(), series.values.size());
+  const std::size_t count = std::min(PlaceCount(series), series.values.size());
   points.reserve(static_cast<qsizetype>(count));
+  const bool isLogarithmic = content_.numbers && content_.numbers->isLogarithmic;
   bool isSorted = true;
   for (std::size_t i = 0; i < count; ++i) {
-    if (!series.times[i].IsValid()) continue;
-    const auto time = static_cast<double>(series.times[i].SecondsSinceEpoch());
+    const double time = PlaceOfValue(series, i);
+    // A logarithmic axis has no place for what is not above 0.
+    if (std::isnan(time) || (isLogarithmic && time <= 0)) continue;
     isSorted = isSorted && (points.isEmpty() || points.back().key <= time);
     // The value holds since the time before. (The chart's own steps lose all that stands behind a gap.)
     if (series.isStepped && !points.isEmpty()) points.push_back({points.back().key, series.values[i]});
@@ -222,31 +207,11 @@ void SeriesPlot::AddCurve(const Series& series, QCPAxis* values) {
 }
 
 void SeriesPlot::ApplyTheme() {
+  StyleChart(*chart_);
+  markers_->ApplyTheme();
   const Theme& theme = Theme::Get();
   const QPalette colors = QApplication::palette();
-  const QColor ink = colors.color(QPalette::Text), quiet = theme.QuietColor();
-  QColor grid = quiet;
-  grid.setAlpha(70);
-  chart_->setBackground(colors.color(QPalette::Base));
-  for (QCPAxis* axis : chart_->axisRect()->axes()) {
-    axis->setBasePen(QPen(quiet, 1));
-    axis->setTickPen(QPen(quiet, 1));
-    axis->setSubTickPen(QPen(quiet, 1));
-    axis->setTickLabelColor(ink);
-    axis->setLabelColor(ink);
-    axis->setTickLabelFont(QApplication::font());
-    axis->setLabelFont(QApplication::font());
-    axis->grid()->setPen(QPen(grid, 1));
-    axis->grid()->setZeroLinePen(QPen(quiet, 1));
-    axis->setTickLength(0, theme.Scaled(5));
-    axis->setSubTickLength(0, theme.Scaled(3));
-  }
-  chart_->legend->setFont(QApplication::font());
-  chart_->legend->setTextColor(ink);
-  chart_->legend->setBrush(Qt::NoBrush);
-  chart_->legend->setBorderPen(Qt::NoPen);
-  chart_->legend->setVisible(true);
-  chart_->legend->setIconSize(theme.Scaled(24), QFontMetrics(QApplication::font()).height());
+  const QColor quiet = theme.QuietColor();
   for (std::size_t i = 0; i < curves_.size(); ++i) {
     const QColor color = CurveColor(i, theme.IsDark());
     // Wider pens are slow, and would join values that stand in neighbouring pixels.
@@ -258,49 +223,56 @@ void SeriesPlot::ApplyTheme() {
       curves_[i].graph->setBrush(fill);
     }
   }
-  if (period_) {
-    QColor shade = theme.NoteColor();
-    shade.setAlpha(theme.IsDark() ? 34 : 26);
-    period_->setBrush(shade);
-    period_->setPen(Qt::NoPen);
+  QColor shade = theme.NoteColor();
+  shade.setAlpha(theme.IsDark() ? 34 : 26);
+  for (QCPItemRect* period : periods_) {
+    period->setBrush(shade);
+    period->setPen(Qt::NoPen);
   }
-  if (pointer_) pointer_->setPen(QPen(quiet, 1, Qt::DashLine));
+  for (QCPItemStraightLine* pointer : pointers_) pointer->setPen(QPen(quiet, 1, Qt::DashLine));
   QPalette quietText = colors;
   quietText.setColor(QPalette::WindowText, quiet);
   quietText.setColor(QPalette::Text, quiet);
   message_->setPalette(quietText);
-  chart_->selectionRect()->setPen(QPen(colors.color(QPalette::Highlight), 1.5));
-  QColor veil = colors.color(QPalette::Highlight);
-  veil.setAlpha(50);
-  chart_->selectionRect()->setBrush(veil);
 }
 
 void SeriesPlot::Arrange() {
   const QFontMetrics metrics(QApplication::font());
   int widest = 1;
   for (const Curve& curve : curves_) widest = std::max(widest, metrics.horizontalAdvance(curve.graph->name()));
-  const int columns = chart_->width() / (widest + Theme::Get().Scaled(44));
-  chart_->legend->setWrap(std::max(1, columns));
-  const int dates = chart_->axisRect()->width() / (metrics.horizontalAdvance("2000/00/00") * 3 / 2);
-  chart_->xAxis->ticker()->setTickCount(std::clamp(dates, 2, 9));
-  const int numbers = chart_->axisRect()->height() / (3 * metrics.height());
-  for (QCPAxis* axis : {chart_->yAxis, chart_->yAxis2}) axis->ticker()->setTickCount(std::clamp(numbers, 2, 7));
+  ArrangeLegend(*chart_, widest);
+  const QString longest = content_.numbers ? "0000.00" : "2000/00/00";
+  for (QCPAxisRect* rect : panels_->Rects()) {
+    const int places = rect->width() / (metrics.horizontalAdvance(longest) * 3 / 2);
+    rect->axis(QCPAxis::atBottom)->ticker()->setTickCount(std::clamp(places, 2, 9));
+    const int numbers = std::clamp(rect->height() / (3 * metrics.height()), 2, 7);
+    for (const auto side : {QCPAxis::atLeft, QCPAxis::atRight}) rect->axis(side)->ticker()->setTickCount(numbers);
+  }
+  markers_->Arrange();
 }
 
 void SeriesPlot::Fit() {
-  chart_->rescaleAxes();
-  for (QCPAxis* axis : {chart_->yAxis, chart_->yAxis2}) {
+  std::optional<QCPRange> keys;
+  for (const Curve& curve : curves_) {
+    bool isFound = false;
+    const bool isLogarithmic = content_.numbers && content_.numbers->isLogarithmic;
+    const QCPRange own = curve.graph->getKeyRange(isFound, isLogarithmic ? QCP::sdPositive : QCP::sdBoth);
+    if (isFound) keys = keys ? keys->expanded(own) : own;
+  }
+  for (QCPAxis* axis : panels_->AllValues()) {
+    axis->rescale();
     // Curves keep off the frame, but what starts at zero stands on it. Names stand above the curves.
     const QCPRange range = axis->range();
     const double size = range.size() > 0 ? range.size() : 1;
     axis->setRange(range.lower == 0 ? 0 : range.lower - 0.04 * size, range.upper + 0.08 * size);
   }
-  if (chart_->xAxis->range().size() <= 0) chart_->xAxis->scaleRange(1.02);
+  if (keys) panels_->Keys().setRange(*keys);
+  if (panels_->Keys().range().size() <= 0) panels_->Keys().scaleRange(1.02);
   chart_->replot(QCustomPlot::rpQueuedReplot);
 }
 
 void SeriesPlot::Zoom(double factor) {
-  chart_->xAxis->scaleRange(1 / factor);
+  panels_->Keys().scaleRange(1 / factor);
   chart_->replot(QCustomPlot::rpQueuedReplot);
 }
 
@@ -315,16 +287,16 @@ bool SeriesPlot::Press(int key) {
       Zoom(1 / kZoomStep);
       return true;
     case Qt::Key_Left:
-      move(chart_->xAxis, -0.15);
+      move(&panels_->Keys(), -0.15);
       break;
     case Qt::Key_Right:
-      move(chart_->xAxis, 0.15);
+      move(&panels_->Keys(), 0.15);
       break;
     case Qt::Key_Up:
-      for (QCPAxis* axis : {chart_->yAxis, chart_->yAxis2}) move(axis, 0.15);
+      for (QCPAxis* axis : panels_->AllValues()) move(axis, 0.15);
       break;
     case Qt::Key_Down:
-      for (QCPAxis* axis : {chart_->yAxis, chart_->yAxis2}) move(axis, -0.15);
+      for (QCPAxis* axis : panels_->AllValues()) move(axis, -0.15);
       break;
     case Qt::Key_Home:
       Fit();
@@ -341,24 +313,25 @@ bool SeriesPlot::eventFilter(QObject* watched, QEvent* event) {
   if (event->type() == QEvent::Resize) message_->setGeometry(chart_->rect());
   if (event->type() == QEvent::Leave) {
     SetStatus({});
-    if (pointer_) {
-      pointer_->setVisible(false);
-      chart_->layer(kPointerLayer)->replot();
-    }
+    for (QCPItemStraightLine* pointer : pointers_) pointer->setVisible(false);
+    chart_->layer(kPointerLayer)->replot();
   }
   return PlotFrame::eventFilter(watched, event);
 }
 
 void SeriesPlot::PointAt(const QMouseEvent* event) {
-  if (!pointer_) return;
-  const bool isInside = chart_->axisRect()->rect().contains(event->pos());
-  const double time = chart_->xAxis->pixelToCoord(event->position().x());
-  pointer_->setVisible(isInside);
-  pointer_->point1->setCoords(time, 0);
-  pointer_->point2->setCoords(time, 1);
+  if (pointers_.empty()) return;
+  const bool isInside = std::ranges::any_of(
+      panels_->Rects(), [&](const QCPAxisRect* rect) { return rect->rect().contains(event->pos()); });
+  const double place = panels_->Keys().pixelToCoord(event->position().x());
+  for (QCPItemStraightLine* pointer : pointers_) {
+    pointer->setVisible(isInside);
+    pointer->point1->setCoords(place, 0);
+    pointer->point2->setCoords(place, 1);
+  }
   // The curves stay as they are drawn.
   chart_->layer(kPointerLayer)->replot();
-  SetStatus(isInside ? TextAt(time) : QString());
+  SetStatus(isInside ? TextAt(place) : QString());
 }
 
 QString SeriesPlot::TextAt(double time) const {
@@ -377,7 +350,7 @@ QString SeriesPlot::TextAt(double time) const {
       if (const auto before = at; before != points.constBegin() && time - (before - 1)->key < before->key - time)
         at = before - 1;
     }
-    if (text.isEmpty()) text = AsDate(at->key).toString("yyyy/MM/dd HH:mm");
+    if (text.isEmpty()) text = PlaceText(at->key, content_.numbers);
     text += "   " + ToQt(curve.series->name) + " " + (std::isnan(at->value) ? tr("no value") : ValueText(at->value));
     if (!std::isnan(at->value) && !curve.series->unit.empty()) text += " " + ToQt(curve.series->unit);
   }
@@ -385,21 +358,22 @@ QString SeriesPlot::TextAt(double time) const {
 }
 
 QString SeriesPlot::ValuesAsText() const {
-  std::map<std::int64_t, std::vector<QString>> rows;
-  QString text = tr("Time");
+  std::map<double, std::vector<QString>> rows;
+  QString text = content_.numbers ? AxisTitle(content_.numbers) : tr("Time");
   for (std::size_t i = 0; i < content_.series.size(); ++i) {
     const Series& series = content_.series[i];
     text += "\t" + NameOf(series);
-    for (std::size_t k = 0; k < std::min(series.times.size(), series.values.size()); ++k) {
-      if (!series.times[k].IsValid()) continue;
-      std::vector<QString>& row = rows[series.times[k].SecondsSinceEpoch()];
+    for (std::size_t k = 0; k < std::min(PlaceCount(series), series.values.size()); ++k) {
+      const double place = PlaceOfValue(series, k);
+      if (std::isnan(place)) continue;
+      std::vector<QString>& row = rows[place];
       row.resize(content_.series.size());
       row[i] = std::isnan(series.values[k]) ? QString() : ToQt(FormatNumber(series.values[k], {}));
     }
   }
   text += "\n";
-  for (const auto& [time, values] : rows) {
-    text += AsDate(static_cast<double>(time)).toString("yyyy-MM-dd HH:mm:ss");
+  for (const auto& [place, values] : rows) {
+    text += content_.numbers ? ToQt(FormatNumber(place, {})) : DateText(place);
     for (const QString& value : values) text += "\t" + value;
     text += "\n";
   }

@@ -20,7 +20,10 @@ class QMouseEvent;
 
 namespace tervane {
 
-/// A chart of a page: curves over time with their legend.
+class ChartMarkers;
+class ChartPanels;
+
+/// A chart of a page: curves over time or a number with their legend, also several charts below each other.
 ///
 /// The wheel zooms in time towards the pointer (with Ctrl in the values), drag moves, Shift and drag zooms to a box, a
 /// double click or Home shows everything; + - and the arrows do the same from the keyboard.
@@ -51,7 +54,9 @@ class SeriesPlot : public PlotFrame {
   struct Curve;
 
   void Build();
-  void AddCurve(const Series& series, QCPAxis* values);
+  /// One of the charts below each other.
+  void BuildPanel(int panel);
+  void AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values);
   void ApplyTheme();
   /// As many columns of names and ticks as there is room for.
   void Arrange();
@@ -64,8 +69,10 @@ class SeriesPlot : public PlotFrame {
   QCustomPlot* chart_;
   QLabel* message_;
   std::vector<Curve> curves_;
-  QCPItemRect* period_ = nullptr;
-  QCPItemStraightLine* pointer_ = nullptr;
+  ChartPanels* panels_ = nullptr;
+  ChartMarkers* markers_ = nullptr;
+  std::vector<QCPItemRect*> periods_;  ///< Of each chart.
+  std::vector<QCPItemStraightLine*> pointers_;
 };
 
 }  // namespace tervane

@@ -4,6 +4,7 @@
 
 #include <filesystem>
 #include <fstream>
+#include <stdexcept>
 
 #include <fmt/format.h>
 #include <gmock/gmock.h>
@@ -152,6 +153,40 @@ TEST(ProcessedPages, ALayerIsChosenFromTheTopAndChangesNothingOfTheSetup) {
   EXPECT_EQ(hints, kViewOnly);
   EXPECT_FALSE(run.Session().IsModified());
   EXPECT_FALSE(run.Session().NeedsAutosave());
+}
+
+TEST(ProcessedPages, ALineOnTheMapShowsTheLayersBelowTheTopographyOfTheReport) {
+  RunSetup run;
+  const auto page = run.Page("Saturated Zone/Lower level of layers");
+  const auto control = [&](ControlKind kind, std::string_view label = {}) -> Control& {
+    for (const auto& each : page->Form().Controls())
+      if (each->kind == kind && each->label == label) return *each;
+    throw std::logic_error("no such control");
+  };
+  const auto map = [&] { return Finished(control(ControlKind::Map).map); };
+  Control& section = control(ControlKind::Section);
+  EXPECT_FALSE(section.IsShown());
+  EXPECT_FALSE(control(ControlKind::Button, "Remove Section").IsEnabled());
+  page->Press(control(ControlKind::Button, "Draw Section"));
+  const MapContent asking = map();
+  ASSERT_TRUE(asking.request.has_value());
+  EXPECT_THAT(Summary(asking), HasSubstr("asks \"Click the points of the section."));
+  const auto& grid = *asking.grids.front().grid;
+  asking.request->taken({grid.CellCentre(10, 18), grid.CellCentre(30, 18)});
+  EXPECT_FALSE(map().request.has_value());
+  EXPECT_THAT(Summary(map()), HasSubstr("1 lines of 2 points, 2 points"));
+  ASSERT_TRUE(section.IsShown());
+  const SectionContent content = Finished(section.section);
+  EXPECT_EQ(Summary(content),
+            "section of 10000 m: ground, Computational Layer 1, Computational Layer 2, Computational Layer 3");
+  // From the top down, as the pages count them.
+  EXPECT_NEAR(content.ground->Value(24, 18), 42, 3);
+  EXPECT_NEAR(content.surfaces[0].bottom->Value(24, 18), -30, 1);
+  EXPECT_NEAR(content.surfaces[2].bottom->Value(24, 18), -90, 1);
+  page->Press(control(ControlKind::Button, "Remove Section"));
+  EXPECT_FALSE(section.IsShown());
+  EXPECT_TRUE(map().lines.empty());
+  EXPECT_FALSE(run.Session().IsModified());
 }
 
 TEST(ProcessedPages, WhatTheReportSaysOfALayerAndAPeriodMayBeWrong) {

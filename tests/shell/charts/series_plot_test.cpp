@@ -107,6 +107,56 @@ TEST(SeriesPlot, TheWheelZoomsInTimeTowardsThePointerAndHomeShowsEverything) {
   EXPECT_EQ(chart.Chart().xAxis->range(), whole);
 }
 
+TEST(SeriesPlot, ChartsBelowEachOtherShareTheirTimeAndHaveAxesOfTheirOwn) {
+  SeriesContent content;
+  content.series = {Daily("Level", "m", {1, 2, 3, 4, 5}), Daily("Rain", "mm", {0, 5, 2, 7, 1}, true),
+                    Daily("Flow", "m3/s", {30, 20, 10, 20, 30})};
+  content.series[1].panel = content.series[2].panel = 1;
+  ShownChart chart(content);
+  ASSERT_EQ(chart.Chart().axisRectCount(), 2);
+  QCPAxisRect &upper = *chart.Chart().axisRect(0), &lower = *chart.Chart().axisRect(1);
+  EXPECT_EQ(upper.left(), lower.left());
+  EXPECT_EQ(upper.right(), lower.right());
+  EXPECT_LT(upper.bottom(), lower.top());
+  EXPECT_FALSE(upper.axis(QCPAxis::atBottom)->tickLabels());
+  EXPECT_TRUE(lower.axis(QCPAxis::atBottom)->tickLabels());
+  EXPECT_EQ(lower.axis(QCPAxis::atRight)->label(), "m3/s");
+  EXPECT_LT(upper.axis(QCPAxis::atLeft)->range().upper, 7);
+  // Zoomed in either, both move.
+  const QPointF inLower(chart.At(3).x(), lower.center().y());
+  Wheel(chart.Chart(), inLower, 3);
+  EXPECT_EQ(upper.axis(QCPAxis::atBottom)->range(), lower.axis(QCPAxis::atBottom)->range());
+  EXPECT_LT(upper.axis(QCPAxis::atBottom)->range().size(), 3 * 86400);
+  Hover(chart.Chart(), inLower);
+  // One chart again, with nothing left of the other.
+  content.series.pop_back();
+  content.series[1].panel = 0;
+  chart.Plot().Show(content);
+  EXPECT_EQ(chart.Chart().axisRectCount(), 1);
+  EXPECT_TRUE(chart.Chart().xAxis->tickLabels());
+}
+
+TEST(SeriesPlot, CurvesOverANumberTellItWithItsUnit) {
+  SeriesContent content;
+  Series curve{"Sand", "-", {}, {0.43, 0.4, 0.2, 0.06}, false, {0, 1, 100, 10000}};
+  content.series = {curve};
+  content.numbers = NumberAxis{"Suction", "cm", false};
+  {
+    ShownChart chart(content);
+    EXPECT_EQ(chart.Chart().xAxis->label(), "Suction [cm]");
+    EXPECT_EQ(chart.Plot().TextAt(90), "Suction 100 cm   Sand 0.2 -");
+    EXPECT_EQ(chart.Plot().ValuesAsText().toStdString(),
+              "Suction [cm]\tSand [-]\n0\t0.43\n1\t0.4\n100\t0.2\n10000\t0.06\n");
+  }
+  content.numbers->isLogarithmic = true;
+  ShownChart chart(content);
+  // Equal factors are equally wide, and 0 has no place.
+  const QCPAxis& axis = *chart.Chart().xAxis;
+  EXPECT_NEAR(axis.coordToPixel(100) - axis.coordToPixel(1), axis.coordToPixel(10000) - axis.coordToPixel(100), 1e-6);
+  EXPECT_EQ(axis.range().lower, 1);
+  EXPECT_EQ(chart.Chart().graph(0)->dataCount(), 3);
+}
+
 TEST(SeriesPlot, NothingToShowShowsItsMessageUntilThereIsSomething) {
   SeriesContent content;
   content.message = "No time series is chosen.";

@@ -1,0 +1,89 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/charts/chart_axis.h"
+
+#include <QDateTime>
+#include <cmath>
+#include <utility>
+
+#include <qcustomplot.h>
+
+#include "shell/widgets/qt_text.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr double kDay = 86400;
+
+QDateTime AsDate(double seconds) {
+  return QDateTime::fromMSecsSinceEpoch(static_cast<qint64>(std::llround(seconds * 1000)), Qt::UTC);
+}
+
+/// Ticks at whole hours, days, months and years, each labelled as finely as it stands.
+class DateTicker : public QCPAxisTickerDateTime {
+ public:
+  DateTicker() { setDateTimeSpec(Qt::UTC); }
+
+ protected:
+  double getTickStep(const QCPRange& range) override {
+    isFirst_ = std::floor(range.lower / kDay) == std::floor(range.upper / kDay);
+    return step_ = QCPAxisTickerDateTime::getTickStep(range);
+  }
+  QString getTickLabel(double tick, const QLocale& /*locale*/, QChar /*formatChar*/, int /*precision*/) override {
+    const QDateTime date = AsDate(tick);
+    if (step_ > 360 * kDay) return date.toString("yyyy");
+    if (step_ > 27 * kDay) return date.toString("yyyy/MM");
+    if (step_ > 0.99 * kDay) return date.toString("yyyy/MM/dd");
+    const QString time = date.toString(step_ > 59 ? "HH:mm" : "HH:mm:ss");
+    // The day is told where it begins, and once where no day begins.
+    const bool isFirst = std::exchange(isFirst_, false);
+    return date.time() == QTime(0, 0) || isFirst ? time + "\n" + date.toString("yyyy/MM/dd") : time;
+  }
+
+ private:
+  double step_ = kDay;
+  bool isFirst_ = false;
+};
+
+}  // namespace
+
+void SetUpAxis(QCPAxis& axis, const std::optional<NumberAxis>& numbers) {
+  const bool isLogarithmic = numbers && numbers->isLogarithmic;
+  axis.setScaleType(isLogarithmic ? QCPAxis::stLogarithmic : QCPAxis::stLinear);
+  if (!numbers) {
+    axis.setTicker(QSharedPointer<DateTicker>::create());
+  } else if (isLogarithmic) {
+    axis.setTicker(QSharedPointer<QCPAxisTickerLog>::create());
+    // Powers of ten, written out while they are short.
+    axis.setNumberFormat("gb");
+    axis.setNumberPrecision(5);
+  } else {
+    axis.setTicker(QSharedPointer<QCPAxisTicker>::create());
+    axis.setNumberFormat("gb");
+    axis.setNumberPrecision(6);
+  }
+}
+
+QString AxisTitle(const std::optional<NumberAxis>& numbers) {
+  if (!numbers) return {};
+  const QString title = ToQt(numbers->title);
+  return numbers->unit.empty() ? title : QString("%1 [%2]").arg(title, ToQt(numbers->unit));
+}
+
+QString PlaceText(double place, const std::optional<NumberAxis>& numbers) {
+  if (!numbers) return AsDate(place).toString("yyyy/MM/dd HH:mm");
+  const QString number = ToQt(numbers->title) + " " + ToQt(FormatNumber(place, "%.6g"));
+  return numbers->unit.empty() ? number : number + " " + ToQt(numbers->unit);
+}
+
+double PlaceOf(const CYbDateTime& time) { return static_cast<double>(time.SecondsSinceEpoch()); }
+
+CYbDateTime DateAt(double place, double perPixel) {
+  double step = 60;
+  for (const double coarser : {3600.0, kDay})
+    if (perPixel > coarser / 12) step = coarser;
+  return CYbDateTime::FromSecondsSinceEpoch(static_cast<std::int64_t>(std::round(place / step) * step));
+}
+
+}  // namespace tervane

@@ -1,0 +1,27 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The horizontal axis of a chart: time, or a number.
+#pragma once
+
+#include <QString>
+#include <optional>
+
+#include "forms/plots.h"
+
+class QCPAxis;
+
+namespace tervane {
+
+/// Ticks at whole hours, days, months and years; or of numbers, also logarithmic.
+void SetUpAxis(QCPAxis& axis, const std::optional<NumberAxis>& numbers);
+/// The title of such an axis, "Suction [cm]"; empty for time.
+QString AxisTitle(const std::optional<NumberAxis>& numbers);
+/// What a user reads of a place on the axis: a date, or a number with its unit.
+QString PlaceText(double place, const std::optional<NumberAxis>& numbers);
+/// The place of a date, and the date of a place.
+double PlaceOf(const CYbDateTime& time);
+/// `perPixel` is the time between two pixels, in seconds: a date that is picked tells no more than that.
+CYbDateTime DateAt(double place, double perPixel);
+
+}  // namespace tervane

@@ -1,0 +1,47 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <QObject>
+#include <vector>
+
+#include "forms/plots.h"
+
+class QCPAxis;
+class QCPAxisRect;
+class QCPMarginGroup;
+class QCPRange;
+class QCustomPlot;
+
+namespace tervane {
+
+/// Charts below each other over one horizontal axis: they are moved and zoomed along it together, and their frames
+/// stand in line. The axis is labelled below the last one.
+class ChartPanels : public QObject {
+  Q_OBJECT
+
+ public:
+  /// `firstRow` is the row of the chart's layout in which its own axes stand.
+  ChartPanels(QCustomPlot& chart, int firstRow);
+
+  /// Makes so many charts; those beyond go. The chart must hold nothing meanwhile.
+  void SetUp(int count, const std::optional<NumberAxis>& numbers);
+  const std::vector<QCPAxisRect*>& Rects() const { return rects_; }
+  /// The horizontal axis of the first chart, which all others follow.
+  QCPAxis& Keys() const;
+  QCPAxis& Keys(int panel) const;
+  /// On the left, or for the second unit on the right.
+  QCPAxis& Values(int panel, bool isSecond) const;
+  std::vector<QCPAxis*> AllValues() const;
+  void SetUpPanel(QCPAxisRect& rect, bool isLast, const std::optional<NumberAxis>& numbers);
+
+ private:
+  void Follow(const QCPRange& range);
+
+  QCustomPlot& chart_;
+  int firstRow_;
+  QCPMarginGroup* margins_;
+  std::vector<QCPAxisRect*> rects_;
+};
+
+}  // namespace tervane
