@@ -124,7 +124,7 @@ template <class Writer>
 void WriteJsonSection(const KvfSection& section, Writer& writer) {
   writer.StartObject();
   for (const KvfNode* node = section.firstChild; node; node = node->next) {
-    writer.Key(node->nameText, node->nameLength);
+    writer.Key(node->name->text, node->name->length);
     if (const KvfSection* child = AsSection(node)) {
       WriteJsonSection(*child, writer);
     } else if (node->count == 1) {

@@ -39,8 +39,7 @@ bool CYbSEDocument::OpenText(std::string_view text, const std::string& path) {
   KvfFile* file = kvfCreate();
   file->path = path;
   file->folder = FolderOf(AbsoluteFromHere(path));
-  file->text = FileContent::Of(text);
-  if (!ParseKvf(*file)) {
+  if (!ParseKvf(FileContent::Of(text), *file)) {
     error_ = fmt::format("{}:{}", path, file->syntaxError.message);
     kvfClose(&file);
     return false;
@@ -52,7 +51,7 @@ bool CYbSEDocument::LoadTree(KvfFile* file, const std::string& path) {
   const OpenFile closer{file};
   if (!kvfTargetByNameNum(file, root_->GetTargetName(), 1)) {
     const KvfNode* first = file->top.firstChild;
-    error_ = fmt::format("{}:{}:1: target {} was expected: target {} is no setup", path, file->LineOf(*first),
+    error_ = fmt::format("{}:{}:1: target {} was expected: target {} is no setup", path, static_cast<int>(first->line),
                          root_->GetTargetName(), first->Name());
     return false;
   }

@@ -129,21 +129,11 @@ int GetParam(KvfNode* section, std::string_view key, Value* value, int instance,
   return 0;
 }
 
-/// The open file in whose tree a keyword or parameter lies, or null: they do not know it themselves.
-KvfFile* OwnerOf(const void* element) {
+/// The open file in whose tree a parameter lies, or null: it does not know it itself.
+KvfFile* OwnerOf(const KvfParam* param) {
   const auto owner = std::find_if(OpenFiles().begin(), OpenFiles().end(),
-                                  [&](const KvfFile* file) { return file->arena.Owns(element); });
+                                  [&](const KvfFile* file) { return file->nodes.Owns(param); });
   return owner == OpenFiles().end() ? nullptr : *owner;
-}
-
-/// The text of a parameter as a C string; copied into the arena of its file when it is first asked.
-const char* TerminatedText(KvfParam& param) {
-  if (!param.terminated) {
-    KvfFile* owner = OwnerOf(&param);
-    if (!owner) return "";
-    owner->SetText(param, param.Text());
-  }
-  return param.text;
 }
 
 constexpr std::string_view kSystemTarget = "SYSTEM";
@@ -159,9 +149,8 @@ KvfSection* SystemTarget(KvfFile& file, bool make) {
 KvfParam& SystemParam(KvfFile& file, std::string_view key, KvfType type) {
   KvfSection& target = *SystemTarget(file, true);
   KvfNode* keyword = FindKvfNode(target, true, key);
-  if (!keyword) keyword = file.AddKeyword(target, key);
-  keyword->count = 0;
-  return file.AddParam(*keyword, type);
+  if (!keyword) keyword = file.AddKeyword(target, key, 0);
+  return file.ReplaceParams(*keyword, type);
 }
 
 }  // namespace
@@ -174,12 +163,13 @@ KvfFile* kvfLoadFile(const std::string& path, int /*mode*/) {
   KvfFile* file = NewFile();
   file->path = path;
   file->folder = FolderOf(AbsoluteFromHere(path));
-  if (const FileResult result = ReadWholeFile(path, file->text); !result.Ok()) {
+  FileContent text;
+  if (const FileResult result = ReadWholeFile(path, text); !result.Ok()) {
     SetError(kKvfCannotRead, result.error);
     kvfClose(&file);
     return nullptr;
   }
-  if (!ParseKvf(*file)) {
+  if (!ParseKvf(text, *file)) {
     SetError(kKvfSyntaxError, fmt::format("{}:{}", path, file->syntaxError.message));
     file->Clear(file->top);
   }
@@ -263,12 +253,7 @@ KvfNode* kvfNodeByNum(KvfNode* section, int n) {
 int kvfIsSection(const KvfNode* node) { return node && node->kind == KvfKind::Section; }
 int kvfIsKeyword(const KvfNode* node) { return node && node->IsKeyword(); }
 
-const char* kvfGetName(KvfNode* node) {
-  if (!node) return nullptr;
-  if (node->nameTerminated) return node->nameText;
-  KvfFile* owner = OwnerOf(node);
-  return owner ? owner->arena.Copy(node->Name()) : "";
-}
+const char* kvfGetName(KvfNode* node) { return node ? node->name->text : nullptr; }
 
 KvfParam* kvfParamByNum(KvfNode* keyword, int n) {
   if (!keyword || !keyword->IsKeyword() || n < 1 || static_cast<std::uint32_t>(n) > keyword->count) return nullptr;
@@ -287,8 +272,8 @@ int kvfGetInt(const KvfParam* param) { return kvfIsInt(param) ? param->asInt : 0
 float kvfGetFloat(const KvfParam* param) { return kvfIsFloat(param) ? param->asFloat : 0; }
 double kvfGetDouble(const KvfParam* param) { return kvfIsDouble(param) ? param->asDouble : 0; }
 bool kvfGetBool(const KvfParam* param) { return kvfIsBool(param) && param->asBool; }
-const char* kvfGetString(KvfParam* param) { return kvfIsString(param) ? TerminatedText(*param) : ""; }
-const char* kvfGetFilename(KvfParam* param) { return kvfIsFilename(param) ? TerminatedText(*param) : ""; }
+const char* kvfGetString(KvfParam* param) { return kvfIsString(param) ? param->text : ""; }
+const char* kvfGetFilename(KvfParam* param) { return kvfIsFilename(param) ? param->text : ""; }
 
 // ---- Typed access by key
 
@@ -366,18 +351,14 @@ int OpenSection(KvfFile* file, KvfKind kind, std::string_view name) {
 template <class Value>
 int AddPlain(KvfFile* file, KvfType type, Value KvfParam::*member, Value value) {
   if (!file || !file->currentKeyword) return 0;
-  file->AddParam(*file->currentKeyword, type).*member = value;
+  file->AddParam(type).*member = value;
   return 1;
 }
 
 int AddText(KvfFile* file, KvfType type, std::string_view value) {
   if (!file || !file->currentKeyword) return 0;
   RefuseNul(*file, value, file->currentKeyword->Name());
-  // The text goes first, so that the parameters of a keyword can lie side by side.
-  KvfParam text;
-  file->SetText(text, value);
-  text.type = type;
-  file->AddParam(*file->currentKeyword, type) = text;
+  file->SetText(file->AddParam(type), value);
   return 1;
 }
 
@@ -396,7 +377,7 @@ int kvfEndSection(KvfFile* file) {
 int kvfAddKeyword(KvfFile* file, std::string_view name) {
   if (!file || file->open.empty() || Trimmed(name).empty()) return 0;
   RefuseNul(*file, name, "a name");
-  file->currentKeyword = file->AddKeyword(file->Cursor(), name);
+  file->BeginKeyword(file->Cursor(), name);
   return 1;
 }
 
@@ -494,8 +475,7 @@ void CopyPath(const std::string& path, char* buffer) {
 
 const char* kvfGetResultFilename(KvfParam* param) {
   if (!kvfIsFilename(param) || FileNameOf(param->Text()).empty()) return nullptr;
-  const char* text = TerminatedText(*param);
-  return text + (FileNameOf(text).data() - text);
+  return param->text + (FileNameOf(param->text).data() - param->text);
 }
 
 void kvfGetResultFilenamePath(KvfParam* param, char* buffer) {

@@ -16,41 +16,18 @@
 #include "core/kvf_parser.h"
 
 #include <algorithm>
-#include <array>
 #include <charconv>
-#include <cmath>
 #include <cstring>
-#include <limits>
-#include <type_traits>
-#include <utility>
 
 #include <fmt/format.h>
 
 #include "core/kvf_chars.h"
+#include "core/kvf_number.h"
 #include "platform/text.h"
 
 namespace tervane {
 
 namespace {
-
-/// The value mantissa * 10^exponent where one rounding gives it, so that it is the same as of a careful conversion: the
-/// mantissa and the power of ten are both numbers of that type. False for the rare others.
-template <class Real>
-bool RealOf(std::uint64_t mantissa, int exponent, bool negative, Real& value) {
-  constexpr int largestExponent = std::is_same_v<Real, float> ? 10 : 22;
-  static constexpr auto powers = [] {
-    std::array<Real, largestExponent + 1> powersOfTen{1};
-    for (std::size_t i = 1; i < powersOfTen.size(); ++i) powersOfTen[i] = powersOfTen[i - 1] * 10;
-    return powersOfTen;
-  }();
-  if (mantissa > std::uint64_t{1} << std::numeric_limits<Real>::digits) return false;
-  if (exponent < -largestExponent || exponent > largestExponent) return false;
-  const Real whole = static_cast<Real>(mantissa);
-  value = exponent < 0 ? whole / powers[static_cast<std::size_t>(-exponent)]
-                       : whole * powers[static_cast<std::size_t>(exponent)];
-  if (negative) value = -value;
-  return true;
-}
 
 /// Bytes of a line as they can be shown in a message: one line, no control characters, whole UTF-8 characters.
 std::string Shown(std::string_view bytes) {
@@ -69,25 +46,23 @@ std::string Shown(std::string_view bytes) {
 
 class Parser {
  public:
-  explicit Parser(KvfFile& file)
-      : file_(file), start_(file.text.data.get()), end_(start_ + file.text.size), at_(start_) {}
+  Parser(const FileContent& text, KvfFile& file)
+      : file_(file), text_(text.Text()), start_(text_.data()), end_(start_ + text_.size()), at_(start_) {}
 
   bool Parse() {
     if (!CheckEncoding()) return false;
-    const char* header = at_;
-    if (!SkipSpace()) return false;
-    file_.header = HeaderOf(header);
-    file_.comments.clear();
+    if (!ParseHeader()) return false;
     while (at_ != end_) {
       if (!ParseTarget()) return false;
       if (!SkipSpace()) return false;
     }
+    file_.currentKeyword = nullptr;
     if (!file_.top.firstChild) return Fail(at_, "the file is empty: target NAME { was expected");
     return true;
   }
 
  private:
-  // The text is followed by a NUL, so one byte may always be looked at without asking for the end.
+  // The text is followed by NULs, so eight bytes may always be looked at without asking for the end.
 
   bool Fail(const char* place, std::string_view expected) {
     const char* lineStart = place;
@@ -118,64 +93,67 @@ class Parser {
     return false;
   }
 
-  bool HasByteOrderMark() const { return file_.text.size >= 3 && std::memcmp(start_, "\xEF\xBB\xBF", 3) == 0; }
+  bool HasByteOrderMark() const { return text_.size() >= 3 && std::memcmp(start_, "\xEF\xBB\xBF", 3) == 0; }
 
   bool CheckEncoding() {
-    if (file_.text.size > kKvfLargestText) return Fail(start_, "the file is larger than 4 GB");
-    if (file_.text.size >= 2 && (std::memcmp(start_, "\xFF\xFE", 2) == 0 || std::memcmp(start_, "\xFE\xFF", 2) == 0))
+    if (text_.size() > kKvfLargestText) return Fail(start_, "the file is larger than 4 GB");
+    if (text_.size() >= 2 && (std::memcmp(start_, "\xFF\xFE", 2) == 0 || std::memcmp(start_, "\xFE\xFF", 2) == 0))
       return Fail(start_, "the file is UTF-16 text: UTF-8 was expected; save it as UTF-8");
     if (HasByteOrderMark()) at_ += 3;
     return true;
   }
 
-  /// The comments in front of the first target, whole lines.
-  std::string_view HeaderOf(const char* header) const {
-    if (file_.comments.empty()) return {};
-    const char* last = start_ + file_.comments.back();
-    const char* lineEnd = std::find(last, end_, '\n');
-    return {header, static_cast<std::size_t>((lineEnd == end_ ? lineEnd : lineEnd + 1) - header)};
+  /// The comments in front of the first target, whole lines, are kept as one text.
+  bool ParseHeader() {
+    const char* header = at_;
+    if (!SkipSpace()) return false;
+    if (!commentEnd_) return true;
+    const char* lineEnd = std::find(commentEnd_, end_, '\n');
+    const std::string_view text(header, static_cast<std::size_t>((lineEnd == end_ ? end_ : lineEnd + 1) - header));
+    file_.header = {file_.texts.Copy(text), text.size()};
+    file_.comments.clear();
+    return true;
   }
 
   // ---- Space
 
   void SkipBlanks() {
-    while (*at_ == ' ' || *at_ == '\t') ++at_;
+    const char* at = at_;
+    while (*at == ' ' || *at == '\t') ++at;
+    at_ = at;
   }
 
-  /// The blanks in front of a line, eight in one step where there are so many.
+  /// The blanks in front of a line.
   void SkipIndentation() {
-    constexpr std::uint64_t eightBlanks = 0x2020'2020'2020'2020;
-    for (std::uint64_t eight; end_ - at_ >= std::ptrdiff_t{sizeof eight}; at_ += sizeof eight) {
-      std::memcpy(&eight, at_, sizeof eight);
-      if (eight != eightBlanks) break;
-    }
-    SkipBlanks();
+    const char* at = at_;
+    for (int count = 8; count == 8; at += count) count = EightChars(at).Blanks();
+    at_ = at;
+    if (*at == '\t') SkipBlanks();
+  }
+
+  /// The end of a line; false where none stands.
+  bool SkipLineEnd() {
+    if (*at_ != '\n' && !(*at_ == '\r' && at_[1] == '\n')) return false;
+    at_ += *at_ == '\n' ? 1 : 2;
+    ++line_;
+    return true;
   }
 
   /// Blanks, line ends and comments.
   bool SkipSpace() {
     for (;;) {
       SkipIndentation();
-      switch (*at_) {
-        case '\n':
-          ++at_;
-          break;
-        case '\r':
-          if (at_[1] != '\n') return FailAtByte();
-          at_ += 2;
-          break;
-        case '#':
-          if (!SkipComment()) return false;
-          break;
-        default:
-          return true;
-      }
+      // What nodes begin with lies above these.
+      if (static_cast<unsigned char>(*at_) > '#') return true;
+      if (SkipLineEnd()) continue;
+      if (*at_ == '\r') return FailAtByte();
+      if (*at_ != '#') return true;
+      if (!SkipComment()) return false;
     }
   }
 
   bool SkipComment() {
     const char* comment = at_;
-    file_.comments.push_back(static_cast<std::uint32_t>(comment - start_));
     bool ascii = true;
     for (;; ++at_) {
       if (Is(*at_, kComment)) continue;
@@ -183,6 +161,9 @@ class Parser {
       ascii = false;
     }
     if (*at_ != '\n' && !(*at_ == '\r' && at_[1] == '\n') && at_ != end_) return FailAtByte();
+    const std::string_view text(comment, static_cast<std::size_t>(at_ - comment));
+    file_.comments.push_back({static_cast<int>(line_), {file_.texts.Copy(text), text.size()}});
+    commentEnd_ = at_;
     return ascii || CheckUtf8(comment, at_);
   }
 
@@ -203,52 +184,33 @@ class Parser {
 
   // ---- Names, targets, sections
 
-  struct Name {
-    std::string_view text;
-    std::uint8_t blanksBefore = 0;
-    std::uint8_t blanksAfter = 0;
-  };
+  // A name is handed on in its written form, with the blanks that its quotes may hold.
 
-  void TakeName(KvfNode& node, const Name& name) {
-    node.nameText = name.text.data();
-    node.nameLength = static_cast<std::uint32_t>(name.text.size());
-    node.blanksBefore = name.blanksBefore;
-    node.blanksAfter = name.blanksAfter;
-  }
-
-  std::string_view ScanWord() {
-    const char* word = at_++;
-    while (Is(*at_, kNameRest)) ++at_;
-    return {word, static_cast<std::size_t>(at_ - word)};
-  }
-
-  bool ParseQuotedName(Name& name) {
-    std::string_view text;
+  bool ParseQuotedName(std::string_view& name) {
     const char* place = at_;
-    if (!ParseString(text)) return false;
-    name.text = Trimmed(text);
-    if (name.text.empty()) return Fail(place, "a name was expected between the quotes");
-    const std::ptrdiff_t before = name.text.data() - text.data();
-    const std::ptrdiff_t after = static_cast<std::ptrdiff_t>(text.size() - name.text.size()) - before;
-    if (before > 255 || after > 255) return Fail(place, "a name with at most 255 blanks around it was expected");
-    name.blanksBefore = static_cast<std::uint8_t>(before);
-    name.blanksAfter = static_cast<std::uint8_t>(after);
+    bool isDecoded = false;
+    if (!ParseString(name, isDecoded)) return false;
+    const std::string_view text = Trimmed(name);
+    if (text.empty()) return Fail(place, "a name was expected between the quotes");
+    const auto before = static_cast<std::size_t>(text.data() - name.data());
+    if (before > 255 || name.size() - text.size() - before > 255)
+      return Fail(place, "a name with at most 255 blanks around it was expected");
     return true;
   }
 
-  bool ParseName(Name& name, std::string_view expected) {
+  bool ParseName(std::string_view& name, std::string_view expected) {
     if (*at_ == '"') return ParseQuotedName(name);
     if (!Is(*at_, kNameStart)) return Fail(at_, expected);
-    name.text = ScanWord();
+    name = ScanWord(at_);
     return true;
   }
 
   bool ParseTarget() {
     const char* place = at_;
     if (!Is(*at_, kNameStart)) return *at_ == '}' ? Fail(at_, "a } without its {") : FailOutside(place);
-    if (ScanWord() != "target") return FailOutside(place);
+    if (ScanWord(at_) != "target") return FailOutside(place);
     SkipBlanks();
-    Name name;
+    std::string_view name;
     if (!ParseName(name, "the name of the target was expected")) return false;
     return ParseBlock(file_.top, KvfKind::Target, name, 1);
   }
@@ -263,17 +225,14 @@ class Parser {
   }
 
   /// `{ nodes }` of a target or section whose name has been read.
-  bool ParseBlock(KvfSection& parent, KvfKind kind, const Name& name, int depth) {
+  bool ParseBlock(KvfSection& parent, KvfKind kind, std::string_view name, int depth) {
+    const std::uint32_t line = line_;
     if (!SkipSpace()) return false;
-    if (*at_ != '{') return Fail(at_, fmt::format("{{ was expected behind the name {}", Shown(name.text)));
+    if (*at_ != '{') return Fail(at_, fmt::format("{{ was expected behind the name {}", Shown(Trimmed(name))));
     const char* brace = at_++;
     if (depth > kKvfDeepestNesting)
       return Fail(brace, fmt::format("sections nested deeper than {} are not read", kKvfDeepestNesting));
-    auto* section = file_.arena.New<KvfSection>();
-    section->kind = kind;
-    section->file = &file_;
-    TakeName(*section, name);
-    file_.Append(parent, *section);
+    KvfSection* section = file_.AddSection(parent, kind, name, line);
     for (;;) {
       if (!SkipSpace()) return false;
       if (*at_ == '}') break;
@@ -284,20 +243,19 @@ class Parser {
   }
 
   bool ParseNode(KvfSection& parent, int depth) {
-    Name name;
+    std::string_view name;
     const char* place = at_;
     if (*at_ == '"') {
       if (!ParseQuotedName(name)) return false;
       SkipBlanks();
     } else if (Is(*at_, kNameStart)) {
-      name.text = ScanWord();
+      name = ScanWord(at_);
       SkipBlanks();
-      if (name.text == "section" && *at_ != '=') {
-        Name sectionName;
-        return ParseName(sectionName, "the name of the section was expected") &&
-               ParseBlock(parent, KvfKind::Section, sectionName, depth + 1);
-      }
-      if (name.text == "target" && *at_ != '=')
+      if (*at_ == '=') return ParseKeyword(parent, name);
+      if (name == "section")
+        return ParseName(name, "the name of the section was expected") &&
+               ParseBlock(parent, KvfKind::Section, name, depth + 1);
+      if (name == "target")
         return Fail(place, fmt::format("the }} that ends {} was expected before a target", Shown(parent.Name())));
     } else if (at_ == end_) {
       return Fail(at_, fmt::format("the file ends here: the }} that ends {} was expected", Shown(parent.Name())));
@@ -307,49 +265,39 @@ class Parser {
       if (byte >= 0x80 && !CheckUtf8(at_, end_)) return false;
       return Fail(at_, "section NAME {, NAME = or } was expected");
     }
-    if (*at_ != '=') return Fail(at_, fmt::format("= was expected behind the name {}", Shown(name.text)));
-    ++at_;
-    auto* keyword = file_.arena.New<KvfNode>();
-    keyword->kind = KvfKind::Keyword;
-    TakeName(*keyword, name);
-    file_.Append(parent, *keyword);
-    return ParseValues(*keyword);
+    if (*at_ == '=') return ParseKeyword(parent, name);
+    return Fail(at_, fmt::format("= was expected behind the name {}", Shown(Trimmed(name))));
   }
 
   // ---- Values
 
-  bool ParseValues(KvfNode& keyword) {
+  /// The values of a keyword, from its = up to the end of its line.
+  bool ParseKeyword(KvfSection& parent, std::string_view name) {
+    ++at_;
+    file_.BeginKeyword(parent, name, line_);
     SkipBlanks();
     if (*at_ == '\n' || *at_ == '\r' || *at_ == '#' || at_ == end_) return EndLine();
-    // Nearly all keywords have one value: its place is right behind its keyword.
-    keyword.params = file_.arena.New<KvfParam>();
-    keyword.capacity = 1;
     for (;;) {
-      if (!ParseValue(file_.AddParam(keyword, KvfType::Int))) return false;
+      if (!ParseValue(file_.AddParam(KvfType::Int))) return false;
       SkipBlanks();
-      if (*at_ != ',') break;
+      if (*at_ != ',') return EndLine();
       ++at_;
-      if (!SkipSpace()) return false;
-      if (*at_ == '}' || at_ == end_) return Fail(at_, "a value was expected behind the comma");
+      if (!SkipSpaceBehindComma()) return false;
     }
-    return EndLine();
+  }
+
+  bool SkipSpaceBehindComma() {
+    SkipBlanks();
+    if (Is(*at_, kDigit)) return true;
+    if (!SkipSpace()) return false;
+    return (*at_ != '}' && at_ != end_) || Fail(at_, "a value was expected behind the comma");
   }
 
   bool EndLine() {
-    switch (*at_) {
-      case '\n':
-        ++at_;
-        return true;
-      case '\r':
-        if (at_[1] != '\n') return FailAtByte();
-        at_ += 2;
-        return true;
-      case '#':
-        return SkipComment();
-      default:
-        return static_cast<unsigned char>(*at_) < 0x20 ? FailAtByte()
-                                                       : Fail(at_, "a comma or the end of the line was expected");
-    }
+    if (SkipLineEnd()) return true;
+    if (*at_ == '#') return SkipComment();
+    return static_cast<unsigned char>(*at_) < 0x20 ? FailAtByte()
+                                                   : Fail(at_, "a comma or the end of the line was expected");
   }
 
   bool ParseValue(KvfParam& value) {
@@ -367,17 +315,25 @@ class Parser {
     }
   }
 
+  bool ParseNumber(KvfParam& value) {
+    const char* place = at_;
+    const char* expected = ScanKvfNumber(at_, value);
+    if (!expected) return true;
+    return *expected == '\0' ? FailNoValue(place) : Fail(place, expected);
+  }
+
   bool ParseText(KvfParam& value) {
     std::string_view text;
-    if (!ParseString(text)) return false;
-    value.text = text.data();
+    bool isDecoded = false;
+    if (!ParseString(text, isDecoded)) return false;
+    value.text = isDecoded ? text.data() : file_.texts.Copy(text);
     value.length = static_cast<std::uint32_t>(text.size());
     return true;
   }
 
   bool ParseWord(KvfParam& value) {
     const char* place = at_;
-    const std::string_view word = ScanWord();
+    const std::string_view word = ScanWord(at_);
     if (word == "true" || word == "false") {
       value.type = KvfType::Bool;
       value.asBool = word == "true";
@@ -386,88 +342,11 @@ class Parser {
       if (*at_ != '"') return Fail(at_, "a file name in double quotes was expected behind file");
       value.type = KvfType::Filename;
       return ParseText(value);
-    } else if (!ParseNotFinite(word, 1, value)) {
+    } else if (!kvf_number::TakeNotFinite(word, 1, value)) {
       return Fail(place, "a value was expected: a number, true, false, \"text\" or file \"name\"");
     }
     return Is(*at_, kDelimiter) ||
            Fail(place, "a value was expected: a number, true, false, \"text\" or file \"name\"");
-  }
-
-  bool ParseNotFinite(std::string_view word, int sign, KvfParam& value) {
-    const bool isFloat = word == "inff" || word == "nanf";
-    if (!isFloat && word != "inf" && word != "nan") return false;
-    if (isFloat) {
-      using Limits = std::numeric_limits<float>;
-      value.type = KvfType::Float;
-      value.asFloat =
-          std::copysign(word[0] == 'i' ? Limits::infinity() : Limits::quiet_NaN(), static_cast<float>(sign));
-    } else {
-      using Limits = std::numeric_limits<double>;
-      value.type = KvfType::Double;
-      value.asDouble = std::copysign(word[0] == 'i' ? Limits::infinity() : Limits::quiet_NaN(), sign);
-    }
-    return true;
-  }
-
-  /// Steps over digits and appends them to `mantissa`, which holds up to 19; gives their number.
-  std::ptrdiff_t ScanDigits(std::uint64_t& mantissa) {
-    const char* at = at_;
-    for (; Is(*at, kDigit); ++at) mantissa = mantissa * 10 + static_cast<std::uint64_t>(*at - '0');
-    return at - std::exchange(at_, at);
-  }
-
-  bool ParseNumber(KvfParam& value) {
-    const char* number = at_;
-    const bool negative = *at_ == '-';
-    if (negative) ++at_;
-    std::uint64_t mantissa = 0;
-    std::ptrdiff_t digitCount = ScanDigits(mantissa);
-    if (digitCount > 0 && Is(*at_, kDelimiter)) {
-      const std::uint64_t most = negative ? 0x8000'0000u : 0x7FFF'FFFFu;
-      // 19 digits cannot have overflowed the 64 bits.
-      if (digitCount > 19 || mantissa > most)
-        return Fail(number, "a whole number from -2147483648 to 2147483647 was expected");
-      value.type = KvfType::Int;
-      const auto whole = static_cast<std::int64_t>(mantissa);
-      value.asInt = static_cast<std::int32_t>(negative ? -whole : whole);
-      return true;
-    }
-    if (negative && (*at_ == 'i' || *at_ == 'n')) {
-      if (ParseNotFinite(ScanWord(), -1, value) && Is(*at_, kDelimiter)) return true;
-      return Fail(number, "a number was expected");
-    }
-    std::ptrdiff_t fractionCount = 0;
-    if (*at_ == '.') {
-      ++at_;
-      fractionCount = ScanDigits(mantissa);
-      digitCount += fractionCount;
-    }
-    if (digitCount == 0) return FailNoValue(number);
-    bool isKnown = digitCount <= 19;  // more may not have fitted
-    int exponent = 0;
-    if (*at_ == 'e' || *at_ == 'E') {
-      ++at_;
-      const bool isSmall = *at_ == '-';
-      if (*at_ == '+' || *at_ == '-') ++at_;
-      std::uint64_t size = 0;
-      const std::ptrdiff_t exponentCount = ScanDigits(size);
-      if (exponentCount == 0) return Fail(number, "a number was expected: its exponent is missing");
-      isKnown = isKnown && exponentCount <= 4;
-      if (isKnown) exponent = isSmall ? -static_cast<int>(size) : static_cast<int>(size);
-    }
-    const char* numberEnd = at_;
-    const bool isFloat = *at_ == 'f';
-    if (isFloat) ++at_;
-    if (!Is(*at_, kDelimiter)) return Fail(number, "a number was expected");
-    value.type = isFloat ? KvfType::Float : KvfType::Double;
-    const auto take = [&](auto& real) {
-      if (isKnown && RealOf(mantissa, exponent - static_cast<int>(fractionCount), negative, real)) return true;
-      const std::from_chars_result result = std::from_chars(number, numberEnd, real);
-      if (result.ec == std::errc::result_out_of_range)
-        return Fail(number, fmt::format("a number that fits a {} was expected", isFloat ? "float" : "double"));
-      return result.ptr == numberEnd || Fail(number, "a number was expected");
-    };
-    return isFloat ? take(value.asFloat) : take(value.asDouble);
   }
 
   bool FailNoValue(const char* place) {
@@ -482,17 +361,17 @@ class Parser {
                            : "a value was expected: a number, true, false, \"text\" or file \"name\"");
   }
 
-  /// A string from its opening quote on; a view into the file's text, or into the arena where it held escapes.
-  bool ParseString(std::string_view& text) {
+  /// A string from its opening quote on: a view into the source, or decoded into the arena where it held escapes, with
+  /// a NUL behind.
+  bool ParseString(std::string_view& text, bool& isDecoded) {
     const char* quote = at_++;
     const char* begin = at_;
     bool ascii = true;
-    bool escaped = false;
     for (;;) {
-      while (Is(*at_, kPlain)) ++at_;
+      SkipPlainChars();
       if (*at_ == '"') break;
       if (*at_ == '\\') {
-        escaped = true;
+        isDecoded = true;
         if (at_[1] == '"' || at_[1] == '\\') ++at_;
         ++at_;
       } else if (static_cast<unsigned char>(*at_) >= 0x80) {
@@ -507,12 +386,18 @@ class Parser {
     text = {begin, static_cast<std::size_t>(at_ - begin)};
     ++at_;
     if (!ascii && !CheckUtf8(begin, at_)) return false;
-    return !escaped || Unescape(text);
+    return !isDecoded || Unescape(text);
+  }
+
+  void SkipPlainChars() {
+    const char* at = at_;
+    for (int count = 8; count == 8; at += count) count = EightChars(at).PlainChars();
+    at_ = at;
   }
 
   bool Unescape(std::string_view& text) {
-    // An escape is never shorter than what it stands for.
-    auto* decoded = static_cast<char*>(file_.arena.Allocate(text.size(), 1));
+    // An escape is longer than what it stands for, so a NUL fits behind.
+    auto* decoded = static_cast<char*>(file_.texts.Allocate(text.size(), 1));
     char* out = decoded;
     const char* end = text.data() + text.size();
     for (const char* in = text.data(); in != end;) {
@@ -553,6 +438,7 @@ class Parser {
           return FailEscape(escape);
       }
     }
+    *out = '\0';
     text = {decoded, static_cast<std::size_t>(out - decoded)};
     return true;
   }
@@ -583,13 +469,16 @@ class Parser {
   }
 
   KvfFile& file_;
-  const char* start_;
-  const char* end_;
+  const std::string_view text_;
+  const char* const start_;
+  const char* const end_;
   const char* at_;
+  std::uint32_t line_ = 1;            ///< The line of `at_`.
+  const char* commentEnd_ = nullptr;  ///< The end of the latest comment.
 };
 
 }  // namespace
 
-bool ParseKvf(KvfFile& file) { return Parser(file).Parse(); }
+bool ParseKvf(const FileContent& text, KvfFile& file) { return Parser(text, file).Parse(); }
 
 }  // namespace tervane

@@ -10,7 +10,9 @@
 
 #include <fmt/format.h>
 
+#include "core/kvf_chars.h"
 #include "core/path.h"
+#include "platform/os.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -21,7 +23,7 @@ namespace {
 constexpr std::uint32_t kWalkLimit = 48;
 
 constexpr std::size_t kFirstChunk = 16 * 1024;
-constexpr std::size_t kLargestChunk = 1024 * 1024;
+constexpr std::size_t kLargestChunk = 8 * 1024 * 1024;
 
 }  // namespace
 
@@ -33,12 +35,14 @@ void* KvfArena::AllocateChunk(std::size_t size) {
   chunks_.push_back({std::make_unique_for_overwrite<char[]>(chunkSize), chunkSize});
   size_ += chunkSize;
   char* start = chunks_.back().memory.get();
+  os::PreferLargePages(start, chunkSize);
   next_ = start + size;
   end_ = start + chunkSize;
   return start;
 }
 
 const char* KvfArena::Copy(std::string_view text) {
+  if (text.empty()) return "";
   auto* copy = static_cast<char*>(Allocate(text.size() + 1, 1));
   std::memcpy(copy, text.data(), text.size());
   copy[text.size()] = '\0';
@@ -58,6 +62,54 @@ bool KvfArena::Owns(const void* address) const {
     return std::greater_equal<>()(address, static_cast<const void*>(start)) &&
            std::less<>()(address, static_cast<const void*>(start + chunk.size));
   });
+}
+
+// ---- Names
+
+KvfNames::Ends KvfNames::EndsOf(std::string_view name) {
+  const auto load = [&]<class Word>(std::size_t place, Word word) {
+    std::memcpy(&word, &name[place], sizeof word);
+    return std::uint64_t{word};
+  };
+  if (name.size() >= 8) return {load(0, std::uint64_t{}), load(name.size() - 8, std::uint64_t{})};
+  if (name.size() >= 4) return {load(0, std::uint32_t{}), load(name.size() - 4, std::uint32_t{})};
+  if (name.empty()) return {0, 0};
+  return {load(0, std::uint8_t{}), load(name.size() / 2, std::uint8_t{}) << 8 | load(name.size() - 1, std::uint8_t{})};
+}
+
+const KvfName* KvfNames::Of(std::string_view written) {
+  // Enough places that the names of a setup rarely meet.
+  constexpr int binaryDigits = 10;
+  if (recent_.empty()) recent_.resize(std::size_t{1} << binaryDigits);
+  const Ends ends = EndsOf(written);
+  const std::uint64_t mixed = (ends.first + std::rotl(ends.last, 29)) * 0x9E37'79B9'7F4A'7C15;
+  Recent& recent = recent_[static_cast<std::size_t>(mixed >> (64 - binaryDigits))];
+  const std::string_view known = recent.name ? recent.name->Written() : std::string_view();
+  // The ends are all of a name of up to 16 characters.
+  const bool isThis =
+      recent.name && recent.ends == ends && known.size() == written.size() && (known.size() <= 16 || known == written);
+  if (!isThis) recent = {ends, Make(written)};
+  return recent.name;
+}
+
+const KvfName* KvfNames::Make(std::string_view written) {
+  const std::string_view text = Trimmed(written);
+  auto* name = texts_.New<KvfName>();
+  name->length = static_cast<std::uint32_t>(text.size());
+  if (text.size() == written.size() || text.empty()) {
+    name->text = texts_.Copy(text);
+    name->isBare = IsBareName(text);
+    return name;
+  }
+  constexpr std::size_t most = 255;
+  const auto before = static_cast<std::size_t>(text.data() - written.data());
+  name->blanksBefore = static_cast<std::uint8_t>(std::min(before, most));
+  name->blanksAfter = static_cast<std::uint8_t>(std::min(written.size() - before - text.size(), most));
+  std::string both(text);
+  both += '\0';
+  both.append(text.data() - name->blanksBefore, name->blanksBefore + text.size() + name->blanksAfter);
+  name->text = texts_.Copy(both);
+  return name;
 }
 
 // ---- Index
@@ -167,60 +219,44 @@ KvfIndex& KvfFile::IndexOf(KvfSection& section) {
   return *section.index;
 }
 
-void KvfFile::SetName(KvfNode& node, std::string_view writtenName) {
-  std::string_view name = Trimmed(writtenName);
-  auto before = static_cast<std::size_t>(name.data() - writtenName.data());
-  std::size_t after = writtenName.size() - name.size() - before;
-  constexpr std::size_t most = 255;
-  before = std::min(before, most);
-  after = std::min(after, most);
-  const std::string_view kept(name.data() - before, before + name.size() + after);
-  node.nameText = arena.Copy(kept) + before;
-  node.nameLength = static_cast<std::uint32_t>(name.size());
-  node.nameTerminated = after == 0;
-  node.blanksBefore = static_cast<std::uint8_t>(before);
-  node.blanksAfter = static_cast<std::uint8_t>(after);
-}
-
-KvfSection* KvfFile::NewSection(KvfKind kind, std::string_view writtenName) {
-  auto* section = arena.New<KvfSection>();
+KvfSection* KvfFile::NewSection(KvfKind kind, std::string_view writtenName, std::uint32_t line) {
+  auto* section = nodes.New<KvfSection>();
+  section->name = names_.Of(writtenName);
   section->kind = kind;
+  section->SetLine(line);
   section->file = this;
-  SetName(*section, writtenName);
   return section;
 }
 
-KvfSection* KvfFile::AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName) {
-  KvfSection* section = NewSection(kind, writtenName);
+KvfSection* KvfFile::AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName, std::uint32_t line) {
+  KvfSection* section = NewSection(kind, writtenName, line);
   Append(parent, *section);
   return section;
 }
 
-KvfNode* KvfFile::AddKeyword(KvfSection& parent, std::string_view writtenName) {
-  auto* keyword = arena.New<KvfNode>();
-  keyword->kind = KvfKind::Keyword;
-  SetName(*keyword, writtenName);
-  Append(parent, *keyword);
-  return keyword;
-}
-
-void KvfFile::MakeRoomForParam(KvfNode& keyword) {
-  const std::size_t oldSize = keyword.capacity * sizeof(KvfParam);
-  if (keyword.capacity > 0 && arena.Extend(keyword.params, oldSize, oldSize + sizeof(KvfParam))) {
-    ++keyword.capacity;
+void KvfFile::MakeRoomForParam() {
+  const std::size_t oldSize = room_ * sizeof(KvfParam);
+  if (nodes.Extend(currentKeyword->params, oldSize, oldSize + sizeof(KvfParam))) {
+    ++room_;
     return;
   }
-  // Texts may lie behind: doubling keeps a long list of them linear.
-  keyword.capacity = std::max(2 * keyword.capacity, std::uint32_t{1});
-  auto* moved = static_cast<KvfParam*>(arena.Allocate(keyword.capacity * sizeof(KvfParam), alignof(KvfParam)));
-  std::uninitialized_copy_n(keyword.params, keyword.count, moved);
-  keyword.params = moved;
+  // Doubling keeps a long list linear that does not fit where it began.
+  room_ *= 2;
+  auto* moved = static_cast<KvfParam*>(nodes.Allocate(room_ * sizeof(KvfParam), alignof(KvfParam)));
+  std::uninitialized_copy_n(currentKeyword->params, currentKeyword->count, moved);
+  currentKeyword->params = moved;
+}
+
+KvfParam& KvfFile::ReplaceParams(KvfNode& keyword, KvfType type) {
+  keyword.params = nodes.New<KvfParam>();
+  keyword.params->type = type;
+  keyword.count = 1;
+  return *keyword.params;
 }
 
 void KvfFile::SetText(KvfParam& param, std::string_view value) {
-  param.text = arena.Copy(value);
+  param.text = texts.Copy(value);
   param.length = static_cast<std::uint32_t>(value.size());
-  param.terminated = true;
 }
 
 void KvfFile::CopyChildren(const KvfSection& from, KvfSection& to) {
@@ -228,18 +264,16 @@ void KvfFile::CopyChildren(const KvfSection& from, KvfSection& to) {
   const KvfNode* const last = from.lastChild;
   for (const KvfNode* node = from.firstChild; node; node = node == last ? nullptr : node->next) {
     if (const KvfSection* section = AsSection(node)) {
-      KvfSection* copy = NewSection(KvfKind::Section, section->WrittenName());
+      KvfSection* copy = NewSection(KvfKind::Section, section->WrittenName(), 0);
       CopyChildren(*section, *copy);
       Append(to, *copy);
       continue;
     }
-    KvfNode* copy = AddKeyword(to, node->WrittenName());
-    copy->params = static_cast<KvfParam*>(arena.Allocate(node->count * sizeof(KvfParam), alignof(KvfParam)));
-    copy->count = copy->capacity = node->count;
-    for (std::uint32_t i = 0; i < node->count; ++i) {
-      auto* param = new (&copy->params[i]) KvfParam(node->params[i]);
+    KvfNode* copy = AddKeyword(to, node->WrittenName(), node->count);
+    for (; copy->count < node->count; ++copy->count) {
+      auto* param = new (&copy->params[copy->count]) KvfParam(node->params[copy->count]);
       param->lookedUp = false;
-      if (param->IsText()) SetText(*param, node->params[i].Text());
+      if (param->IsText()) SetText(*param, param->Text());
     }
   }
 }
@@ -249,22 +283,6 @@ void KvfFile::Clear(KvfSection& section) {
   section.count = 0;
   section.index = nullptr;
 }
-
-int KvfFile::LineAt(const char* place) const {
-  const char* start = text.data.get();
-  if (!start || std::less<>()(place, start) || std::greater<>()(place, start + text.size)) return 0;
-  if (lineStarts_.empty()) {
-    lineStarts_.push_back(0);
-    for (const char* at = start;
-         (at = static_cast<const char*>(std::memchr(at, '\n', static_cast<std::size_t>(start + text.size - at))));)
-      lineStarts_.push_back(static_cast<std::uint32_t>(++at - start));
-  }
-  const auto offset = static_cast<std::uint32_t>(place - start);
-  const auto behind = std::upper_bound(lineStarts_.begin(), lineStarts_.end(), offset);
-  return static_cast<int>(behind - lineStarts_.begin());
-}
-
-int KvfFile::LineOf(const KvfNode& node) const { return LineAt(node.nameText - node.blanksBefore); }
 
 // ---- Reports
 
@@ -310,7 +328,7 @@ std::vector<KvfUnread> CollectUnread(const KvfFile& file) {
   const auto visit = [&](const KvfNode& node, const std::string& path, int instance) {
     if (!IsUnread(node)) return false;
     const std::string name = PathName(node.Name(), instance);
-    const int line = file.LineOf(node);
+    const int line = static_cast<int>(node.line);
     const std::string_view before = instance > 1 ? "another " : "";
     const std::string_view reason =
         instance > 1 && node.kind != KvfKind::Target ? "a repetition that nothing reads" : "nothing reads it";
@@ -333,15 +351,12 @@ std::vector<KvfUnread> CollectUnread(const KvfFile& file) {
   };
   WalkWithPaths(file.top, {}, visit);
 
-  const std::string_view text = file.text.Text();
-  for (const std::uint32_t place : file.comments) {
-    const std::string_view comment = text.substr(place, text.find('\n', place) - place);
+  for (const KvfComment& comment : file.comments)
     result.push_back(
         {KvfUnread::Kind::Comment,
-         file.LineAt(text.data() + place),
+         comment.line,
          {},
-         fmt::format("comment {}: comments behind the first target are not kept", Excerpt(Trimmed(comment)))});
-  }
+         fmt::format("comment {}: comments behind the first target are not kept", Excerpt(Trimmed(comment.text)))});
   return result;
 }
 
@@ -355,7 +370,7 @@ std::vector<KvfPlacedNote> CollectNotes(const KvfFile& file) {
       const bool isKey = node.IsKeyword();
       const std::string place = isKey ? path : JoinPath(path, PathName(node.Name(), instance));
       for (const std::string* text : found->second)
-        result.push_back({file.LineOf(node), place, isKey ? std::string(node.Name()) : std::string(), *text});
+        result.push_back({static_cast<int>(node.line), place, isKey ? std::string(node.Name()) : std::string(), *text});
     }
     return !node.IsKeyword();
   });

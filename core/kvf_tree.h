@@ -1,19 +1,20 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// A parameter file in memory: targets hold sections and keywords, keywords hold typed parameters. The file owns one
-// buffer with its text and one arena with its tree; names and texts are views into either. Nodes never move.
+// A parameter file in memory: targets hold sections and keywords, keywords hold typed parameters. The file owns two
+// arenas, one with its nodes, one with its names and texts; the text that it was read from is not kept. Nodes never
+// move.
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <deque>
 #include <memory>
+#include <span>
 #include <string>
 #include <string_view>
 #include <utility>
 #include <vector>
-
-#include "platform/files.h"
 
 namespace tervane {
 
@@ -29,38 +30,53 @@ struct KvfParam {
     float asFloat;
     double asDouble;
     bool asBool;
-    const char* text;  ///< String and Filename: `length` bytes, no escapes.
+    const char* text;  ///< String and Filename: `length` bytes, no escapes, and a NUL behind.
   };
   std::uint32_t length = 0;
   KvfType type = KvfType::Int;
   bool lookedUp = false;
-  bool terminated = false;  ///< The text is followed by a NUL.
 
   KvfParam() : asInt(0) {}
   bool IsText() const { return type == KvfType::String || type == KvfType::Filename; }
   std::string_view Text() const { return {text, length}; }
 };
 
-/// A target, a section or a keyword.
-struct KvfNode {
-  const char* nameText = "";
-  std::uint32_t nameLength = 0;
-  KvfKind kind = KvfKind::Section;
-  bool lookedUp : 1 = false;
-  bool nameTerminated : 1 = false;
-  std::uint8_t blanksBefore = 0;  ///< Blanks around the name inside its quotes: kept in the file, no part of the name.
+/// A name; nodes of the same name share it.
+struct KvfName {
+  const char* text = "";  ///< A NUL stands behind, and behind that the written form where blanks surround the name.
+  std::uint32_t length = 0;
+  std::uint8_t blanksBefore = 0;  ///< Blanks inside the quotes: kept in the file, no part of the name.
   std::uint8_t blanksAfter = 0;
+  bool isBare = false;  ///< It may be written without quotes.
+
+  std::string_view Text() const { return {text, length}; }
+  std::string_view Written() const {
+    if (blanksBefore + blanksAfter == 0) return Text();
+    return {text + length + 1, std::size_t{blanksBefore} + length + blanksAfter};
+  }
+};
+
+/// A target, a section or a keyword. The parameters of a keyword usually lie right behind it.
+struct alignas(KvfParam) KvfNode {
+  const KvfName* name = &kNoName;
   KvfNode* next = nullptr;  ///< The following node of the same parent.
   KvfParam* params = nullptr;
-  std::uint32_t count = 0;     ///< Number of parameters of a keyword, of children of a section.
-  std::uint32_t capacity = 0;  ///< Number of parameters of a keyword that have a place.
+  std::uint32_t count = 0;      ///< Number of parameters of a keyword, of children of a section.
+  std::uint32_t line : 29 = 0;  ///< Where it was read; 0 for a node that was not.
+  KvfKind kind : 2 = KvfKind::Section;
+  bool lookedUp : 1 = false;
 
-  std::string_view Name() const { return {nameText, nameLength}; }
+  static constexpr KvfName kNoName{};
+
+  std::string_view Name() const { return name->Text(); }
   /// The name with the blanks that surround it in the file.
-  std::string_view WrittenName() const {
-    return {nameText - blanksBefore, std::size_t{nameLength} + blanksBefore + blanksAfter};
-  }
+  std::string_view WrittenName() const { return name->Written(); }
   bool IsKeyword() const { return kind == KvfKind::Keyword; }
+  /// Lines behind the last that fits are told as that one.
+  void SetLine(std::uint32_t number) {
+    constexpr std::uint32_t last = (1u << 29) - 1;
+    line = std::min(number, last) & last;
+  }
 };
 
 class KvfIndex;
@@ -126,8 +142,10 @@ class KvfArena {
     return start;
   }
   template <class T>
-  T* New() {
-    return new (Allocate(sizeof(T), alignof(T))) T;
+  T* New(std::size_t count = 1) {
+    auto* first = static_cast<T*>(Allocate(count * sizeof(T), alignof(T)));
+    std::uninitialized_default_construct_n(first, count);
+    return first;
   }
   /// A copy of the text, followed by a NUL.
   const char* Copy(std::string_view text);
@@ -150,11 +168,42 @@ class KvfArena {
   char* end_ = nullptr;
 };
 
+/// The names of a file. Those that come again and again are stored once.
+class KvfNames {
+ public:
+  explicit KvfNames(KvfArena& texts) : texts_(texts) {}
+
+  /// The name of a written form, which may have blanks around it.
+  const KvfName* Of(std::string_view written);
+
+ private:
+  /// What tells short names apart, and hardly ever confuses long ones: the first and the last eight characters.
+  struct Ends {
+    std::uint64_t first, last;
+    bool operator==(const Ends&) const = default;
+  };
+  struct Recent {
+    Ends ends;
+    const KvfName* name;
+  };
+
+  static Ends EndsOf(std::string_view name);
+  const KvfName* Make(std::string_view written);
+
+  KvfArena& texts_;
+  std::vector<Recent> recent_;  ///< At each place the latest name of those that have it.
+};
+
 /// Where and why a text is no parameter file. Line and column (in characters) count from 1.
 struct KvfSyntaxError {
   int line = 0;
   int column = 0;
   std::string message;  ///< "118:7: SearchRadius = 12x: a number was expected"
+};
+
+struct KvfComment {
+  int line;
+  std::string_view text;  ///< From its # on.
 };
 
 /// What a reader found odd about a node that it read all the same.
@@ -169,14 +218,14 @@ struct KvfFile {
   KvfFile(const KvfFile&) = delete;
   KvfFile& operator=(const KvfFile&) = delete;
 
-  std::string path;    ///< Where it was read from; empty for a file under construction.
-  std::string folder;  ///< Absolute folder that relative filenames start from; of a file under construction, the
-                       ///< folder that it will be written to. Empty when unknown.
-  FileContent text;
-  std::string_view header;              ///< Comments before the first target, written again in front.
-  std::vector<std::uint32_t> comments;  ///< Places in the text of the comments that come later.
-  KvfArena arena;
-  KvfSection top;  ///< Its children are the targets.
+  std::string path;         ///< Where it was read from; empty for a file under construction.
+  std::string folder;       ///< Absolute folder that relative filenames start from; of a file under construction, the
+                            ///< folder that it will be written to. Empty when unknown.
+  std::string_view header;  ///< Comments before the first target, written again in front.
+  std::vector<KvfComment> comments;  ///< The comments that come later.
+  KvfArena nodes;                    ///< Nodes and their parameters.
+  KvfArena texts;                    ///< Names and texts.
+  KvfSection top;                    ///< Its children are the targets.
   KvfSyntaxError syntaxError;
   std::vector<KvfNote> notes;
 
@@ -186,23 +235,36 @@ struct KvfFile {
   std::string unwritable;  ///< What was added although no file can hold it; empty when all is well.
 
   KvfSection& Cursor() { return open.empty() ? top : *open.back(); }
-  KvfSection* AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName);
-  KvfNode* AddKeyword(KvfSection& parent, std::string_view writtenName);
-  KvfParam& AddParam(KvfNode& keyword, KvfType type) {
-    if (keyword.count == keyword.capacity) MakeRoomForParam(keyword);
-    auto* param = new (&keyword.params[keyword.count++]) KvfParam;
+  KvfSection* AddSection(KvfSection& parent, KvfKind kind, std::string_view writtenName, std::uint32_t line = 0);
+  /// A keyword with a place for so many parameters right behind it.
+  KvfNode* AddKeyword(KvfSection& parent, std::string_view writtenName, std::uint32_t room, std::uint32_t line = 0) {
+    void* place = nodes.Allocate(sizeof(KvfNode) + room * sizeof(KvfParam), alignof(KvfNode));
+    auto* keyword = new (place) KvfNode;
+    keyword->name = names_.Of(writtenName);
+    keyword->kind = KvfKind::Keyword;
+    keyword->SetLine(line);
+    keyword->params = reinterpret_cast<KvfParam*>(keyword + 1);
+    Append(parent, *keyword);
+    return keyword;
+  }
+  /// A keyword that gets parameters one by one; only the latest can. Nearly all have one.
+  void BeginKeyword(KvfSection& parent, std::string_view writtenName, std::uint32_t line = 0) {
+    room_ = 1;
+    currentKeyword = AddKeyword(parent, writtenName, room_, line);
+  }
+  KvfParam& AddParam(KvfType type) {
+    if (currentKeyword->count == room_) MakeRoomForParam();
+    auto* param = new (&currentKeyword->params[currentKeyword->count++]) KvfParam;
     param->type = type;
     return *param;
   }
+  /// Gives a keyword one parameter instead of those that it has.
+  KvfParam& ReplaceParams(KvfNode& keyword, KvfType type);
   void SetText(KvfParam& param, std::string_view value);
   /// Appends copies of all children of `from` to `to`.
   void CopyChildren(const KvfSection& from, KvfSection& to);
   /// Takes all nodes out of a section.
   void Clear(KvfSection& section);
-
-  /// The line of a node, from 1; 0 for a node that was not parsed.
-  int LineOf(const KvfNode& node) const;
-  int LineAt(const char* place) const;
 
   void Append(KvfSection& parent, KvfNode& child) {
     (parent.lastChild ? parent.lastChild->next : parent.firstChild) = &child;
@@ -213,12 +275,12 @@ struct KvfFile {
   KvfIndex& IndexOf(KvfSection& section);
 
  private:
-  KvfSection* NewSection(KvfKind kind, std::string_view writtenName);
-  void SetName(KvfNode& node, std::string_view writtenName);
-  void MakeRoomForParam(KvfNode& keyword);
+  KvfSection* NewSection(KvfKind kind, std::string_view writtenName, std::uint32_t line);
+  void MakeRoomForParam();
 
+  KvfNames names_{texts};
   std::deque<KvfIndex> indices_;
-  mutable std::vector<std::uint32_t> lineStarts_;  ///< Made when a line is first asked.
+  std::uint32_t room_ = 0;  ///< Number of parameters that have a place at `currentKeyword`.
 };
 
 // Walking without leaving a trace: nothing below marks a node as looked up.

@@ -11,6 +11,7 @@
 #include <fmt/format.h>
 
 #include "core/kvf_chars.h"
+#include "platform/os.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -62,7 +63,13 @@ class TextWriter {
   void Values(const KvfNode& keyword);
   void Nodes(const KvfSection& section, std::size_t indent);
 
+  /// Whether all texts so far were UTF-8.
+  bool IsUtf8() const { return isUtf8_; }
+
  private:
+  /// A text of any length that may hold any character.
+  void AppendEscaped(std::string_view value);
+
   /// The place of the next bytes in the buffer, null (and the buffer empty) when they are more than it holds.
   char* Room(std::size_t size) {
     if (size > static_cast<std::size_t>(buffer_.data() + buffer_.size() - out_)) Flush();
@@ -76,10 +83,33 @@ class TextWriter {
   std::string& text_;
   std::array<char, 4096> buffer_;
   char* out_ = buffer_.data();
+  bool isUtf8_ = true;
 };
 
 void TextWriter::Quoted(std::string_view value) {
+  // Nearly all texts are short and plain: they are copied as they are, then looked at in their new place. The quotes
+  // behind end the look.
+  constexpr std::size_t quotes = 8;
+  if (char* place = Room(1 + value.size() + quotes)) {
+    *place++ = '"';
+    std::copy(value.begin(), value.end(), place);
+    std::memset(place + value.size(), '"', quotes);
+    std::size_t plain = 0;
+    for (int count = 8; count == 8; plain += static_cast<std::size_t>(count))
+      count = EightChars(place + plain).PlainChars();
+    if (plain == value.size()) {
+      out_ = place + plain + 1;
+      return;
+    }
+  }
   Put('"');
+  AppendEscaped(value);
+  Put('"');
+}
+
+void TextWriter::AppendEscaped(std::string_view value) {
+  // Texts stand between ASCII, so the whole is UTF-8 when each is.
+  if (FirstInvalidUtf8(value)) isUtf8_ = false;
   while (!value.empty()) {
     const auto isUnescaped = [](char c) { return Is(c, kUnescaped); };
     const auto plain =
@@ -107,24 +137,13 @@ void TextWriter::Quoted(std::string_view value) {
     }
     value.remove_prefix(plain + 1);
   }
-  Put('"');
 }
 
 void TextWriter::Name(const KvfNode& node) {
-  const std::string_view name = node.WrittenName();
-  // Nearly all names are short and bare: they are copied while they are checked.
-  if (char* place = Room(name.size()); place && !name.empty() && Is(name[0], kNameStart)) {
-    std::size_t size = 0;
-    for (; size < name.size() && Is(name[size], kNameRest); ++size) place[size] = name[size];
-    if (size == name.size()) {
-      out_ += size;
-      return;
-    }
-  }
-  if (IsBareName(name))
-    Put(name);
+  if (node.name->isBare)
+    Put(node.Name());
   else
-    Quoted(name);
+    Quoted(node.WrittenName());
 }
 
 /// A float or double in its shortest form; a double that looks like a whole number gets a point.
@@ -237,12 +256,17 @@ bool WriteKvfText(const KvfFile& file, std::string& text, std::string& error) {
     error = file.unwritable;
     return false;
   }
-  // A node with its name and value takes about twice the memory of its line.
-  text.reserve(file.header.size() + file.arena.Size() / 2);
+  // A node with its values takes somewhat more memory than its line without its texts.
+  text.reserve(file.header.size() + file.nodes.Size() + file.texts.Size());
+  os::PreferLargePages(text.data(), text.capacity());
   text = file.header;
-  AppendKvfNodes(file.top, 0, text);
-  // Texts stand between ASCII, so the whole is UTF-8 when each is; only the unlucky case looks for the one that is not.
-  if (FirstInvalidUtf8(std::string_view(text).substr(file.header.size()))) {
+  bool isUtf8 = true;
+  {
+    TextWriter writer(text);
+    writer.Nodes(file.top, 0);
+    isUtf8 = writer.IsUtf8();
+  }
+  if (!isUtf8) {
     text.clear();
     error = fmt::format("{} is no UTF-8 text", FindBadText(file.top));
     return false;

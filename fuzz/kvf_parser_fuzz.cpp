@@ -25,8 +25,7 @@ struct Parsed {
   explicit Parsed(std::string_view text) : file(kvfCreate()) {
     file->folder = "/setups";
     file->path = "/setups/fuzzed.tvd";
-    file->text = FileContent::Of(text);
-    ok = ParseKvf(*file);
+    ok = ParseKvf(FileContent::Of(text), *file);
   }
   ~Parsed() { kvfClose(&file); }
   Parsed(const Parsed&) = delete;

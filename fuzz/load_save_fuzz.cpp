@@ -46,8 +46,7 @@ constexpr double kMostItems = 2000;
 
 bool AsksForTooMuch(std::string_view input) {
   KvfFile file;
-  file.text = FileContent::Of(input);
-  return ParseKvf(file) && AskedItems(file.top) > kMostItems;
+  return ParseKvf(FileContent::Of(input), file) && AskedItems(file.top) > kMostItems;
 }
 
 void Check(std::string_view input) {

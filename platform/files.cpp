@@ -260,7 +260,8 @@ ReadOutcome ReadOnce(const std::string& path, FileContent& content, ProgressPart
   if (!reason.empty()) return ReadOutcome::Failed;
   const auto size = static_cast<std::size_t>(status.size);
   content = {};
-  content.data = std::make_unique_for_overwrite<char[]>(size + 1);
+  content.data = std::make_unique_for_overwrite<char[]>(size + FileContent::kNulsBehind);
+  os::PreferLargePages(content.data.get(), size);
   std::error_code error;
   while (content.size < size) {
     const std::size_t done = file.Read(content.data.get() + content.size, std::min(size - content.size, kPiece), error);
@@ -272,7 +273,7 @@ ReadOutcome ReadOnce(const std::string& path, FileContent& content, ProgressPart
     content.size += done;
     progress.Tell(static_cast<double>(content.size) / static_cast<double>(size));
   }
-  content.data[size] = '\0';
+  std::fill_n(content.data.get() + size, FileContent::kNulsBehind, '\0');
   char more;
   return file.Read(&more, 1, error) == 0 ? ReadOutcome::Done : ReadOutcome::Grown;
 }
@@ -311,9 +312,9 @@ Reason OpenOldFile(const fs::path& target, os::File& old, os::File::Status& stat
 
 FileContent FileContent::Of(std::string_view text) {
   FileContent content;
-  content.data = std::make_unique_for_overwrite<char[]>(text.size() + 1);
+  content.data = std::make_unique_for_overwrite<char[]>(text.size() + kNulsBehind);
   content.size = text.size();
-  *std::copy(text.begin(), text.end(), content.data.get()) = '\0';
+  std::fill_n(std::copy(text.begin(), text.end(), content.data.get()), kNulsBehind, '\0');
   return content;
 }
 

@@ -25,8 +25,10 @@ struct FileResult {
   bool Ok() const { return error.empty(); }
 };
 
-/// The bytes of a file, in one block without growth, followed by a NUL.
+/// The bytes of a file, in one block without growth, followed by NULs: a reader may look at eight bytes from any place.
 struct FileContent {
+  static constexpr std::size_t kNulsBehind = 8;
+
   std::unique_ptr<char[]> data;
   std::size_t size = 0;
 

@@ -36,6 +36,7 @@
 #include <pwd.h>
 #include <signal.h>
 #include <sys/file.h>
+#include <sys/mman.h>
 #include <sys/stat.h>
 #include <unistd.h>
 #ifdef __linux__
@@ -223,25 +224,6 @@ std::string DemangledName(const std::type_info& type) {
 
 std::uint32_t ProcessId() { return GetCurrentProcessId(); }
 
-bool IsProcessAlive(std::uint32_t processId) {
-  void* process = OpenProcess(SYNCHRONIZE, FALSE, processId);
-  if (!process) return GetLastError() == ERROR_ACCESS_DENIED;
-  const bool runs = WaitForSingleObject(process, 0) == WAIT_TIMEOUT;
-  CloseHandle(process);
-  return runs;
-}
-
-std::string ProcessStartTime(std::uint32_t processId) {
-  void* process = OpenProcess(PROCESS_QUERY_LIMITED_INFORMATION, FALSE, processId);
-  if (!process) return {};
-  FILETIME start{}, end{}, kernel{}, user{};
-  const bool done = GetProcessTimes(process, &start, &end, &kernel, &user);
-  CloseHandle(process);
-  return done ? std::to_string((std::uint64_t{start.dwHighDateTime} << 32) | start.dwLowDateTime) : std::string();
-}
-
-std::uint32_t ParentOf(std::uint32_t /*processId*/) { return 0; }
-
 std::string UserName() {
   wchar_t name[UNLEN + 1];
   DWORD size = UNLEN + 1;
@@ -263,6 +245,9 @@ std::uint64_t PeakResidentMemory() {
   PROCESS_MEMORY_COUNTERS counters{};
   return GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof counters) ? counters.PeakWorkingSetSize : 0;
 }
+
+// Large pages need a privilege here that users do not have.
+void PreferLargePages(void*, std::size_t) {}
 
 #else
 
@@ -529,47 +514,6 @@ std::string DemangledName(const std::type_info& type) {
 
 std::uint32_t ProcessId() { return static_cast<std::uint32_t>(getpid()); }
 
-namespace {
-
-/// A field of what the system tells of a process, from 3 on; empty where it tells nothing.
-std::string StatusField(std::uint32_t processId, int wanted) {
-  std::ifstream file("/proc/" + std::to_string(processId) + "/stat");
-  std::string text;
-  std::getline(file, text, '\0');
-  // The second field is the program's name in parentheses, which may itself hold blanks and parentheses.
-  const std::size_t nameEnd = text.rfind(')');
-  if (nameEnd == std::string::npos) return {};
-  std::istringstream fields(text.substr(nameEnd + 1));
-  std::string field;
-  for (int number = 3; number <= wanted; ++number) fields >> field;
-  return fields ? field : std::string();
-}
-
-}  // namespace
-
-bool IsProcessAlive(std::uint32_t processId) {
-  if (processId == 0 || processId > static_cast<std::uint32_t>(INT_MAX)) return false;
-  if (kill(static_cast<pid_t>(processId), 0) != 0 && errno != EPERM) return false;
-  // One that has ended stays in the table until its parent asks how it went.
-  constexpr int kState = 3;
-  const std::string state = StatusField(processId, kState);
-  return state != "Z" && state != "X";
-}
-
-std::string ProcessStartTime(std::uint32_t processId) {
-  constexpr int kStartTime = 22;
-  const std::string field = StatusField(processId, kStartTime);
-  // It counts from the start of the machine.
-  std::string boot;
-  std::ifstream("/proc/sys/kernel/random/boot_id") >> boot;
-  return field.empty() ? std::string() : field + " " + boot;
-}
-
-std::uint32_t ParentOf(std::uint32_t processId) {
-  constexpr int kParent = 4;
-  return static_cast<std::uint32_t>(std::strtoul(StatusField(processId, kParent).c_str(), nullptr, 10));
-}
-
 std::string HostName() {
   char name[256] = {};
   return gethostname(name, sizeof name - 1) == 0 ? name : "";
@@ -585,6 +529,18 @@ std::string UserName() {
 
 std::uint64_t ResidentMemory() { return MemoryFromStatus("VmRSS:"); }
 std::uint64_t PeakResidentMemory() { return MemoryFromStatus("VmHWM:"); }
+
+void PreferLargePages([[maybe_unused]] void* memory, [[maybe_unused]] std::size_t size) {
+#ifdef MADV_HUGEPAGE
+  if (size < std::size_t{4} * 1024 * 1024) return;
+  // It is a wish about whole pages, so the neighbours on the first and the last may take part. A system without large
+  // pages refuses, and nothing is lost.
+  const auto page = static_cast<std::uintptr_t>(sysconf(_SC_PAGESIZE));
+  const auto place = reinterpret_cast<std::uintptr_t>(memory);
+  const std::uintptr_t begin = place & ~(page - 1);
+  madvise(reinterpret_cast<void*>(begin), place + size - begin, MADV_HUGEPAGE);
+#endif
+}
 
 #endif
 

@@ -128,5 +128,8 @@ std::string UserName();
 /// The size of the process's resident memory in bytes, and its peak; 0 where unknown.
 std::uint64_t ResidentMemory();
 std::uint64_t PeakResidentMemory();
+/// To be called before a large piece of memory is filled: has the system give it in large pages where it can do so for
+/// the asking, which takes a fraction of the time. Less than 4 MB is left as it is.
+void PreferLargePages(void* memory, std::size_t size);
 
 }  // namespace tervane::os

@@ -16,9 +16,12 @@
 #else
 #include <array>
 #include <cerrno>
+#include <climits>
 #include <csignal>
 #include <cstring>
 #include <filesystem>
+#include <fstream>
+#include <sstream>
 #include <unordered_map>
 
 #include <fcntl.h>
@@ -214,6 +217,27 @@ void EndGroup(std::uint32_t processId, bool politely) {
   TerminateProcess(process, 1);
   CloseHandle(process);
 }
+
+// ---- Other processes
+
+bool IsProcessAlive(std::uint32_t processId) {
+  void* process = OpenProcess(SYNCHRONIZE, FALSE, processId);
+  if (!process) return GetLastError() == ERROR_ACCESS_DENIED;
+  const bool runs = WaitForSingleObject(process, 0) == WAIT_TIMEOUT;
+  CloseHandle(process);
+  return runs;
+}
+
+std::string ProcessStartTime(std::uint32_t processId) {
+  void* process = OpenProcess(PROCESS_QUERY_LIMITED_INFORMATION, FALSE, processId);
+  if (!process) return {};
+  FILETIME start{}, end{}, kernel{}, user{};
+  const bool done = GetProcessTimes(process, &start, &end, &kernel, &user);
+  CloseHandle(process);
+  return done ? std::to_string((std::uint64_t{start.dwHighDateTime} << 32) | start.dwLowDateTime) : std::string();
+}
+
+std::uint32_t ParentOf(std::uint32_t /*processId*/) { return 0; }
 
 #else
 
@@ -412,6 +436,49 @@ void RequestEnd(std::uint32_t processId) {
 void EndGroup(std::uint32_t processId, bool politely) {
   // 0 and 1 would be the own group and everybody's.
   if (processId > 1) kill(-static_cast<pid_t>(processId), politely ? SIGTERM : SIGKILL);
+}
+
+// ---- Other processes
+
+namespace {
+
+/// A field of what the system tells of a process, from 3 on; empty where it tells nothing.
+std::string StatusField(std::uint32_t processId, int wanted) {
+  std::ifstream file("/proc/" + std::to_string(processId) + "/stat");
+  std::string text;
+  std::getline(file, text, '\0');
+  // The second field is the program's name in parentheses, which may itself hold blanks and parentheses.
+  const std::size_t nameEnd = text.rfind(')');
+  if (nameEnd == std::string::npos) return {};
+  std::istringstream fields(text.substr(nameEnd + 1));
+  std::string field;
+  for (int number = 3; number <= wanted; ++number) fields >> field;
+  return fields ? field : std::string();
+}
+
+}  // namespace
+
+bool IsProcessAlive(std::uint32_t processId) {
+  if (processId == 0 || processId > static_cast<std::uint32_t>(INT_MAX)) return false;
+  if (kill(static_cast<pid_t>(processId), 0) != 0 && errno != EPERM) return false;
+  // One that has ended stays in the table until its parent asks how it went.
+  constexpr int kState = 3;
+  const std::string state = StatusField(processId, kState);
+  return state != "Z" && state != "X";
+}
+
+std::string ProcessStartTime(std::uint32_t processId) {
+  constexpr int kStartTime = 22;
+  const std::string field = StatusField(processId, kStartTime);
+  // It counts from the start of the machine.
+  std::string boot;
+  std::ifstream("/proc/sys/kernel/random/boot_id") >> boot;
+  return field.empty() ? std::string() : field + " " + boot;
+}
+
+std::uint32_t ParentOf(std::uint32_t processId) {
+  constexpr int kParent = 4;
+  return static_cast<std::uint32_t>(std::strtoul(StatusField(processId, kParent).c_str(), nullptr, 10));
 }
 
 #endif

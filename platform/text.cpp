@@ -52,12 +52,13 @@ char* Shortest(Number value, char* buffer) {
   constexpr std::string_view kNotANumber = "nan";
   if (std::isnan(value)) return std::copy(kNotANumber.begin(), kNotANumber.end(), buffer);
   char* const bufferEnd = buffer + kNumberBuffer;
+  const Number size = std::abs(value);
   // "100000" is longer than "1e5", but what a reader expects of a count or a coordinate.
-  const bool isModerateWhole = std::abs(value) < Number(1e9) && std::trunc(value) == value;
-  const std::to_chars_result result = isModerateWhole
-                                          ? std::to_chars(buffer, bufferEnd, value, std::chars_format::fixed)
-                                          : std::to_chars(buffer, bufferEnd, value);
-  return ShortenExponent(buffer, result.ptr);
+  if (size < Number(1e9) && std::trunc(value) == value)
+    return std::to_chars(buffer, bufferEnd, value, std::chars_format::fixed).ptr;
+  char* const end = std::to_chars(buffer, bufferEnd, value).ptr;
+  // Between these an exponent is never shorter.
+  return size >= Number(1e-3) && size < Number(1e9) ? end : ShortenExponent(buffer, end);
 }
 
 template <typename Number>

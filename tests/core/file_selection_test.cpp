@@ -17,8 +17,7 @@ using testing::IsEmpty;
 std::string LoadAndSave(CYbSEKvfBase& node, std::string_view section) {
   KvfFile* file = kvfCreate();
   file->folder = "/data";
-  file->text = FileContent::Of(section);
-  EXPECT_TRUE(ParseKvf(*file)) << file->syntaxError.message;
+  EXPECT_TRUE(ParseKvf(FileContent::Of(section), *file)) << file->syntaxError.message;
   node.Load(kvfTargetByNum(file, 1));
   EXPECT_THAT(CollectUnread(*file), IsEmpty());
   kvfClose(&file);

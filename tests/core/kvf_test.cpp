@@ -155,6 +155,27 @@ TEST(Kvf, NodesAreFoundByNumberAndByNameInSmallAndInLargeSections) {
                parsed.Target(0) || parsed.Target(4));
 }
 
+TEST(Kvf, NamesThatAreAlikeStayApart) {
+  std::vector<std::string> names = {
+      " a", "a ", " a ", "a b", "1", "ä", " aaaab", " aaab", "first-8-1-last--8", "first-8-2-last--8"};
+  for (std::size_t length = 1; length <= 40; ++length)
+    for (const std::size_t place : {std::size_t{0}, length / 2, length - 1}) {
+      names.emplace_back(length, 'a');
+      names.push_back(names.back());
+      names.back()[place] = 'b';
+    }
+  std::string text = "target T {\n";
+  for (const std::string& name : names) text += "section \"" + name + "\" {\n}\n\"" + name + "\" =\n";
+  const Parsed parsed(text + "}");
+  int number = 0;
+  for (const std::string& name : names)
+    for (int kind = 0; kind < 2; ++kind) {
+      KvfNode* node = kvfNodeByNum(parsed.Target(), ++number);
+      ASSERT_STREQ(kvfGetName(node), std::string(Trimmed(name)).c_str());
+      ASSERT_EQ(node->WrittenName(), name);
+    }
+}
+
 TEST(Kvf, ANumberIsTakenInAnotherFormWhereNothingIsLost) {
   // What takes it: `i`nt, `f`loat, `d`ouble.
   for (const char* row :

@@ -73,9 +73,8 @@ inline std::vector<std::string> LoadText(CYbSEKvfGlobalBase& root, const std::st
   KvfFile* file = kvfCreate();
   const std::string lines = Replaced(Replaced(content, "}", "\n}\n"), ";", "\n");
   file->folder = "/data";
-  file->text = FileContent::Of("target " + root.GetTargetName() + " {\n" + lines + "\n}");
   std::vector<std::string> notes;
-  if (ParseKvf(*file)) {
+  if (ParseKvf(FileContent::Of("target " + root.GetTargetName() + " {\n" + lines + "\n}"), *file)) {
     root.Load(&file->top);
     for (const KvfPlacedNote& note : CollectNotes(*file))
       notes.push_back(note.path + ":" + note.key + ": " + note.text);

@@ -19,8 +19,7 @@ class Parsed {
   explicit Parsed(std::string_view text, std::string_view path = "/setups/x.tvd") : Parsed() {
     file_->path = path;
     file_->folder = FolderOf(path);
-    file_->text = FileContent::Of(text);
-    ok_ = ParseKvf(*file_);
+    ok_ = ParseKvf(FileContent::Of(text), *file_);
   }
   ~Parsed() { kvfClose(&file_); }
   Parsed(const Parsed&) = delete;

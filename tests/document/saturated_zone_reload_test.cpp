@@ -67,8 +67,7 @@ constexpr const char* kZone = R"(target T {
 
 TEST(SaturatedZoneReload, ReadsTheZoneAndTheLayersOnceMoreWithoutListsAndInternalBoundaries) {
   KvfFile* file = kvfCreate();
-  file->text = FileContent::Of(kZone);
-  ASSERT_TRUE(ParseKvf(*file));
+  ASSERT_TRUE(ParseKvf(FileContent::Of(kZone), *file));
   KvfNode* target = kvfTargetByNameNum(file, "T", 1);
 
   CYbSEKvfGlobalBase root("T");
