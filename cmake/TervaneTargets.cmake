@@ -68,8 +68,11 @@ function(tervane_program name)
 endfunction()
 
 # tervane_test([DESKTOP] LINKS ...): the GoogleTest program of a folder and all below it, run as one test of the
-# folder's name.
+# folder's name; nothing in a build without unit tests.
 function(tervane_test)
+  if(NOT TERVANE_UNIT_TESTS)
+    return()
+  endif()
   cmake_parse_arguments(ARG "DESKTOP" "" "LINKS" ${ARGN})
   get_filename_component(folder ${CMAKE_CURRENT_SOURCE_DIR} NAME)
   file(GLOB_RECURSE sources CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*_test.cpp
