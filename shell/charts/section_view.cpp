@@ -74,6 +74,8 @@ SectionView::SectionView(Host& host, QWidget* parent)
 
 SectionView::~SectionView() = default;
 
+QWidget* SectionView::FocusTarget() const { return chart_; }
+
 void SectionView::Show(SectionContent content, const DisplayUnits* units) {
   const DisplayUnits chosen = units ? *units : DisplayUnits();
   if (isShown_ && chosen == displayUnits_ && LooksSame(content, content_)) return;

@@ -36,6 +36,7 @@ class SectionView : public PlotFrame {
   void Show(SectionContent content, const DisplayUnits* units);
   void ShowWhenThere(const std::function<SectionContent()>& content, const DisplayUnits* units);
   QCustomPlot& Chart() const { return *chart_; }
+  QWidget* FocusTarget() const;
   /// What the user reads at a distance and a height, in metres: the ground there, and the layer that he points at.
   QString TextAt(double distance, double height) const;
   /// All layers at a distance, a line for each, from top to bottom.

@@ -2,8 +2,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <QHBoxLayout>
 
-#include <qcustomplot.h>
-
 #include "forms/plots.h"
 #include "shell/charts/section_view.h"
 #include "shell/charts/series_plot.h"
@@ -90,7 +88,7 @@ class SectionWidget : public ControlWidget {
   }
   bool GrowsDown() const override { return true; }
   bool GrowsRight() const override { return true; }
-  QWidget* FocusTarget() const override { return &view_->Chart(); }
+  QWidget* FocusTarget() const override { return view_->FocusTarget(); }
 
  protected:
   void SyncValue() override {
