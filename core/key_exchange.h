@@ -204,7 +204,8 @@ class KeyExchange {
   bool Check(const Rule& rule, const Value& value) {
     Finish();
     if constexpr (std::is_same_v<Value, int> || std::is_floating_point_v<Value>) {
-      if (rule.written && rule.since != KeyInfo::kNoLimit) checked_ = {rule.key, static_cast<double>(value), {}, {}};
+      if (rule.written && rule.since != KeyInfo::kNoLimit)
+        checked_ = {std::string(rule.key), static_cast<double>(value), {}, {}};
     }
     return false;
   }
@@ -237,7 +238,7 @@ class KeyExchange {
   bool isRestoring_ = false;
   StrayReport report_;
   struct {
-    std::string_view key;  ///< Empty while there is nothing to judge.
+    std::string key;  ///< Empty while there is nothing to judge. A copy: a declaration may make its key on the spot.
     double value = 0;
     KeyFacts facts;
     const void* member = nullptr;
