@@ -17,7 +17,6 @@
 #include "shell/charts/chart_markers.h"
 #include "shell/charts/chart_panels.h"
 #include "shell/charts/chart_style.h"
-#include "shell/charts/dense_graph.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -180,7 +179,7 @@ void SeriesPlot::BuildPanel(int panel) {
 }
 
 void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) {
-  auto* graph = new DenseGraph(keys, values);
+  QCPGraph* graph = chart_->addGraph(keys, values);
   const auto shown = QSharedPointer<QCPGraphDataContainer>::create();
   QVector<QCPGraphData> points;
   const std::size_t count = std::min(PlaceCount(series), series.values.size());
@@ -200,7 +199,7 @@ void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) 
   graph->setData(shown);
   graph->setName(NameOf(series));
   graph->setAdaptiveSampling(true);
-  // Each value is seen as a point where points do not run together.
+  // A value between two gaps makes no line, and is seen as a point where points do not run together.
   constexpr qsizetype kFewPoints = 60;
   if (points.size() <= kFewPoints && !series.isStepped)
     graph->setScatterStyle(QCPScatterStyle(QCPScatterStyle::ssDisc, Theme::Get().Scaled(4)));
