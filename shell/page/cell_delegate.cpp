@@ -90,14 +90,12 @@ void CellDelegate::updateEditorGeometry(QWidget* editor, const QStyleOptionViewI
                                         const QModelIndex& index) const {
   QStyledItemDelegate::updateEditorGeometry(editor, option, index);
   // A line with a button needs more room than a narrow column has.
-  auto* edit = qobject_cast<QLineEdit*>(editor);
+  const auto* edit = qobject_cast<QLineEdit*>(editor);
   if (!edit || edit->actions().isEmpty()) return;
   QRect place = editor->geometry();
   const int wanted =
       edit->fontMetrics().horizontalAdvance(index.data(Qt::EditRole).toString()) + Theme::Get().Scaled(48);
   place.setWidth(std::max(place.width(), std::min(wanted, editor->parentWidget()->width() - place.left())));
-  // Over other cells it needs an edge.
-  edit->setFrame(place.width() > editor->width());
   editor->setGeometry(place);
 }
 
@@ -160,7 +158,6 @@ void CellDelegate::initStyleOption(QStyleOptionViewItem* option, const QModelInd
     option->icon = {};
     option->features &= ~QStyleOptionViewItem::HasDecoration;
   }
-  if (!(option->state & QStyle::State_Enabled)) option->state &= ~QStyle::State_Selected;
   if (KindAt(index) == CellKind::Check && IsGrey(index)) option->state &= ~QStyle::State_Enabled;
 }
 

@@ -122,15 +122,7 @@ void TableView::ConnectView() {
   connect(view_, &QTableView::clicked, this, [this, press](const QModelIndex& index) {
     if (control_.table->IsLink(index.row() + 1, index.column() + 1)) press(index.row(), index.column());
   });
-  connect(model_, &QAbstractItemModel::modelReset, this, [this] {
-    hasUsersWidths_ = false;
-    FitColumns();
-  });
-  connect(view_->horizontalHeader(), &QHeaderView::sectionResized, this, [this] {
-    // The widths are the user's from the first one on that he drags.
-    const bool isDragged = view_->horizontalHeader()->underMouse() && (QApplication::mouseButtons() & Qt::LeftButton);
-    hasUsersWidths_ = hasUsersWidths_ || (isDragged && !isFitting_);
-  });
+  connect(model_, &QAbstractItemModel::modelReset, this, &TableView::FitColumns);
   connect(view_->selectionModel(), &QItemSelectionModel::selectionChanged, this, &TableView::SyncButtons);
   connect(view_->selectionModel(), &QItemSelectionModel::currentChanged, this,
           [this](const QModelIndex& current, const QModelIndex& before) {
@@ -376,11 +368,14 @@ bool TableView::eventFilter(QObject* watched, QEvent* event) {
 
 void TableView::resizeEvent(QResizeEvent* event) {
   QWidget::resizeEvent(event);
-  if (!hasUsersWidths_) FitColumns();
+  if (hasFittedColumns_ || (!isVisible() && !control_.table->IsShownOnly())) return;
+  // Columns that do not fit begin narrower; from then on they are the user's. What is only shown follows its room.
+  hasFittedColumns_ = !control_.table->IsShownOnly();
+  FitColumns();
 }
 
 void TableView::FitColumns() {
-  // Columns that do not fit are narrower. The view itself is laid out later.
+  // The view itself is laid out later.
   const int edges = 2 * view_->frameWidth() + style()->pixelMetric(QStyle::PM_ScrollBarExtent);
   const QHeaderView& rowHeads = *view_->verticalHeader();
   int room = width() - edges - (rowHeads.isHidden() ? 0 : rowHeads.sizeHint().width());
@@ -391,7 +386,6 @@ void TableView::FitColumns() {
     // Buttons keep their width, so that their texts stay whole.
     (shown.IsButton() ? room : wanted) += shown.IsButton() ? -width : width;
   }
-  isFitting_ = true;
   const double share = wanted > room ? static_cast<double>(std::max(room, 0)) / wanted : 1;
   QHeaderView& head = *view_->horizontalHeader();
   for (int column = 0; column < model_->columnCount(); ++column) {
@@ -403,7 +397,6 @@ void TableView::FitColumns() {
   }
   const TableColumn* last = control_.table->Column(model_->columnCount());
   head.setStretchLastSection(!last || !last->IsButton());
-  isFitting_ = false;
 }
 
 void TableView::OfferUnits(int column, const QPoint& place) {

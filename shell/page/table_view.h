@@ -71,7 +71,7 @@ class TableView : public QWidget {
   QTableView* view_;
   QLabel* message_;
   QToolButton *insert_, *delete_, *up_, *down_;
-  bool hasUsersWidths_ = false, isFitting_ = false;
+  bool hasFittedColumns_ = false;
   bool isSyncing_ = false;
   bool isSelectedByHead_ = false;  ///< In a table of one column each cell would be a whole row.
 };
