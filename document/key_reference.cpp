@@ -23,8 +23,8 @@ void Describe(CYbSEKvfBase& node, const std::string& parentPath, std::vector<Key
     Describe(*child, path, sections);
   // All items are alike: one that is not in the list stands for them.
   if (list && list->GetItemCount() == 0) Describe(*list->NewItemNode(), path, sections);
-  auto* zones = dynamic_cast<CFMSEKvfBase*>(&node);
-  if (zones && ZoneItems(*zones).empty()) Describe(*zones->CreateStationItem(), path, sections);
+  if (auto* zones = dynamic_cast<CFMSEKvfBase*>(&node); zones && ZoneItems(*zones).empty())
+    if (const auto zone = zones->CreateStationItem()) Describe(*zone, path, sections);
 }
 
 /// The path with `%d` for the number that each step ends in: "A/Item_12/B" gives "A/Item_%d/B".

@@ -12,7 +12,7 @@
 #include "data/datafile.h"
 #include "spatial/data_use.h"
 #include "spatial/file_nodes.h"
-#include "spatial/zone_sync.h"
+#include "spatial/station_owner.h"
 
 namespace tervane {
 
@@ -35,10 +35,8 @@ struct ForcingKind {
   const PageClass* stationPage;
 };
 
-/// Texts of a value's two forms in time, and of the two sources of areas; in the file one higher.
+/// Texts of a value's two forms in time; in the file one higher.
 inline constexpr KeyChoice kTemporalDistributions[] = {{0, "Constant"}, {1, "Time varying (.nds0)"}};
-inline constexpr KeyChoice kAreaSources[] = {{0, "Grid codes (.nds2)"}, {1, "Polygons (.shp)"}};
-inline constexpr KeyChoice kDistributions[] = {{0, "Uniform"}, {1, "Station based"}, {2, "Fully distributed"}};
 
 /// A constant or a time series.
 class CGlobalKvf : public CTvnKvfBase {
@@ -59,33 +57,6 @@ class CGlobalKvf : public CTvnKvfBase {
   CFMData0DFile* file_;
 };
 
-/// How the station areas are given. The stations themselves are children of its parent.
-class CStationBasedKvf : public CTvnKvfBase, public CellValues {
- public:
-  explicit CStationBasedKvf(CFMSEKvfBase* parent);
-
-  enum Source : int { kGridCodes = 0, kPolygons = 1 };
-
-  int TYPE = kGridCodes;
-  int ShapeAxisUnit;             ///< Of the polygons' coordinates, a unit key of item 100187.
-  std::string ShapeGapFillName;  ///< Of the station that fills the cells outside all polygons.
-
-  CTvnData2DNdsFile& GridFile() const { return *gridFile_; }
-  CData2DShpFile& ShapeFile() const { return *shapeFile_; }
-
-  /// Of the codes of the stations, whatever the distribution.
-  GridSource CurrentSource() const override;
-  void ReadData(KvfNode* section) override;
-
- protected:
-  void ExchangeKeys(KeyExchange& keys) override;
-
- private:
-  CFMSEKvfBase& owner_;
-  CTvnData2DNdsFile* gridFile_;
-  CData2DShpFile* shapeFile_;
-};
-
 /// One grid for each time step.
 class CFullyDistributedKvf : public CTvnKvfBase {
  public:
@@ -104,28 +75,17 @@ class CFullyDistributedKvf : public CTvnKvfBase {
 };
 
 /// A station with its value or series.
-class C2DStationBasedDataTimeSeriesKvf : public CFMSEKvfGroupBase {
+class C2DStationBasedDataTimeSeriesKvf : public StationKvf {
  public:
   C2DStationBasedDataTimeSeriesKvf(const ForcingKind& kind, CYbSEKvfBase* parent);
 
   enum Temporal : int { kConstant = 0, kTimeVarying = 1 };
 
-  std::string NAME = "Undefined";
-  std::string GRIDCODEID = "Undefined";  ///< The grid code or the polygon's value.
   float FIXED_VALUE = 0;
   int TYPE = kTimeVarying;
   float Elevation = 0;  ///< Of the station, quantity 100180; only where the kind has elevations.
 
   CFMData0DFile& SeriesFile() const { return *file_; }
-
-  void SetStationName(const std::string& name) override { NAME = name; }
-  std::string GetStationName() const override { return NAME; }
-  void SetStationId(const std::string& id) override { GRIDCODEID = id; }
-  std::string GetStationId() const override { return GRIDCODEID; }
-
-  /// Counted among the stations alone.
-  int GetNumberWhatAmI() const override;
-  void ReadData(KvfNode* section) override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
@@ -136,15 +96,12 @@ class C2DStationBasedDataTimeSeriesKvf : public CFMSEKvfGroupBase {
 };
 
 /// A forcing.
-class C2DStationBasedDataKvf : public CFMSEKvfBase, public ForcingNode {
+class C2DStationBasedDataKvf : public StationOwnerKvf, public ForcingNode {
  public:
   /// The kind of a forcing of that quantity, or of precipitation depths, with the usual pages.
   static ForcingKind PlainKind(int itemType);
   C2DStationBasedDataKvf(ForcingKind kind, std::string title, std::string section, CYbSEKvfBase* parent);
 
-  enum Distribution : int { kUniform = 0, kStationBased = 1, kFullyDistributed = 2 };
-
-  int DistributionType = kUniform;
   float Elevation = 0;  ///< Of the uniform series, quantity 100180; only where the kind has elevations.
 
   const ForcingKind& Kind() const { return kind_; }
@@ -153,28 +110,9 @@ class C2DStationBasedDataKvf : public CFMSEKvfBase, public ForcingNode {
   /// Whether the setup corrects the forcing for elevation.
   bool IsCorrectedForElevation() const { return HasElevation() && kind_.correctedWhen.Holds(*this); }
   CGlobalKvf& Global() const { return *global_; }
-  CStationBasedKvf& Stations() const { return *stations_; }
   CFullyDistributedKvf& FullyDistributed() const { return *fully_; }
 
-  bool UsesGridCodes() const {
-    return DistributionType == kStationBased && stations_->TYPE == CStationBasedKvf::kGridCodes;
-  }
-  bool UsesPolygons() const {
-    return DistributionType == kStationBased && stations_->TYPE == CStationBasedKvf::kPolygons;
-  }
-
   std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
-  /// What the source of the station areas holds; nothing for the other distributions.
-  FoundZones FindStations() const { return Finder()({}); }
-  ZoneFinder Finder() const;
-  SyncPlan PlanStations(const FoundZones& found) { return PlanSync(*this, found); }
-  /// Brings the stations in step; for another distribution than by stations all go.
-  SyncResult SyncStations(const FoundZones& found);
-  SyncResult SyncStations() { return SyncStations(FindStations()); }
-  CFMSEKvfGroupBase* SelectStationByCode(int code) const;
-  CFMSEKvfGroupBase* SelectStationByName(const std::string& name) const;
-  std::vector<std::string> GetStationNames() const { return ZoneItemTitles(*this); }
-
   Forcing CurrentForcing() const override;
   /// By its rule; without one as its parent does.
   int IsDlgUsedInSetup() override;
@@ -185,7 +123,6 @@ class C2DStationBasedDataKvf : public CFMSEKvfBase, public ForcingNode {
  private:
   ForcingKind kind_;
   CGlobalKvf* global_;
-  CStationBasedKvf* stations_;
   CFullyDistributedKvf* fully_;
 };
 

@@ -160,9 +160,9 @@ FoundZones FindPolygonValues(const std::string& file, const std::string& attribu
   return found;
 }
 
-ZoneFinder CodeFinder(const DataFileNode& file) {
-  return [path = file.File.Absolute(), item = file.SelectedItem()](ProgressPart progress) {
-    return FindGridCodes(path, item, progress);
+ZoneFinder CodeFinder(const DataFileNode& file, const char* noValues) {
+  return [path = file.File.Absolute(), item = file.SelectedItem(), noValues](ProgressPart progress) {
+    return FindGridCodes(path, item, progress, noValues);
   };
 }
 
@@ -214,7 +214,7 @@ SyncResult SyncItems(CFMSEKvfBase& owner, const FoundZones& found) {
   if (!found.unreadable.empty() || !found.message.empty()) return kNothing;
   const Matching matching = Match(owner, found);
   for (const std::string& id : matching.added) {
-    const std::shared_ptr<CFMSEKvfGroupBase> item = owner.CreateStationItem();
+    const std::shared_ptr<CFMSEKvfGroupBase> item = owner.CreateFoundItem();
     SetIdentity(*item, id, TitleOf(id, found.areCodes));
     owner.AddChild(item);
   }

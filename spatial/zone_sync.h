@@ -43,8 +43,10 @@ class CFMSEKvfBase : public CTvnKvfBase {
  public:
   using CTvnKvfBase::CTvnKvfBase;
 
-  /// A child as it begins, with this node as its parent; not added.
+  /// A child as it begins, with this node as its parent; not added. Null for a node that has none.
   virtual std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() = 0;
+  /// The same for a code or value that a file was found to hold.
+  virtual std::shared_ptr<CFMSEKvfGroupBase> CreateFoundItem() { return CreateStationItem(); }
 };
 
 /// What happened to the children, as pages turn it into hints.
@@ -71,7 +73,7 @@ FoundZones FindPolygonValues(const std::string& file, const std::string& attribu
                              ProgressPart progress = {});
 /// Looks into a file for them; it asks no node, so that another thread may do it.
 using ZoneFinder = std::function<FoundZones(ProgressPart progress)>;
-ZoneFinder CodeFinder(const DataFileNode& file);
+ZoneFinder CodeFinder(const DataFileNode& file, const char* noValues = FoundZones::kNoValuesInGrid);
 ZoneFinder PolygonFinder(const CData2DShpFile& file, int axisUnit);
 
 /// What a synchronisation would do to the children.

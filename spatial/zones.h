@@ -6,12 +6,11 @@
 #pragma once
 
 #include <memory>
+#include <optional>
 #include <string>
-#include <vector>
 
 #include "core/list.h"
-#include "spatial/file_nodes.h"
-#include "spatial/zone_sync.h"
+#include "spatial/zone_source.h"
 
 namespace tervane {
 
@@ -38,68 +37,39 @@ class CSubcatchmentRiverlinksListKvf : public CYbSEKvfListBase<CSubcatchmentRive
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("Noofreaches", *this); }
 };
 
-/// A zone: who it is and how it is called. What else it holds is told by the class.
-class CodedZoneProp : public CFMSEKvfGroupBase {
- public:
-  using CFMSEKvfGroupBase::CFMSEKvfGroupBase;
+inline constexpr KeyChoice kZoneDistributions[] = {{0, "Uniform"}, {1, "Distributed"}};
 
-  int ProfileSecNumber = 0;  ///< The running number among the zones, from 1, given when the parent is written.
-  std::string GRIDCODEID;    ///< The grid code or the attribute value, as text.
-  std::string Name;
-
-  void SetStationName(const std::string& name) override { Name = name; }
-  std::string GetStationName() const override { return Name; }
-  void SetStationId(const std::string& id) override { GRIDCODEID = id; }
-  std::string GetStationId() const override { return GRIDCODEID; }
-
-  void ReadData(KvfNode* section) override;
-
- protected:
-  /// The keys that every zone begins with.
-  void ExchangeKeys(KeyExchange& keys) override;
+/// What makes one parent of zones differ from the next: a row, written where its owner makes it.
+struct CodedZonesKind {
+  std::string_view className;
+  const char* title;
+  const char* section;
+  ZoneSourceKind source;
+  std::optional<int> distribution = 1;  ///< The default; none where zones are always distributed, and no key says so.
+  /// A zone as it begins; null for a map of zones without properties.
+  std::shared_ptr<CFMSEKvfGroupBase> (*makeZone)(CYbSEKvfBase* parent);
+  const PageClass* page;
 };
 
-inline constexpr KeyChoice kZoneDistributions[] = {{0, "Uniform"}, {1, "Distributed"}};
-inline constexpr KeyChoice kZoneSources[] = {{0, "Grid codes (.nds2)"},
-                                             {1, "Polygons (.shp)"}};  ///< One higher in the file.
+/// `MakeZone<CSubcatchmentPropKvf>`, for a row.
+template <class Zone>
+std::shared_ptr<CFMSEKvfGroupBase> MakeZone(CYbSEKvfBase* parent) {
+  return std::make_shared<Zone>(parent);
+}
 
 /// The parent of zones.
-class CodedZonesKvf : public CFMSEKvfBase, public CellValues {
+class CodedZonesKvf : public CFMSEKvfBase, public ZoneSource {
  public:
-  /// `countKey` is the key of the number of zones.
-  CodedZonesKvf(std::string title, std::string section, const char* countKey, CYbSEKvfBase* parent);
+  /// `kind` must outlive the node: a constant.
+  CodedZonesKvf(const CodedZonesKind& kind, CYbSEKvfBase* parent);
 
   enum Distribution : int { kUniform = 0, kDistributed = 1 };
-  enum Source : int { kGridCodes = 0, kPolygons = 1 };
 
-  int DistributionType = kDistributed;
-  int Type = kGridCodes;
-  int ShapeAxisUnit;             ///< Of the polygons' coordinates, a unit key of item 100187.
-  std::string ShapeGapFillName;  ///< Of the zone that fills the cells outside all polygons.
+  int DistributionType;
 
-  CTvnData2DNdsFile& GridFile() const { return *gridFile_; }
-  CData2DShpFile& ShapeFile() const { return *shapeFile_; }
+  const CodedZonesKind& Kind() const { return kind_; }
 
-  bool UsesGridCodes() const { return DistributionType == kDistributed && Type == kGridCodes; }
-  bool UsesPolygons() const { return DistributionType == kDistributed && Type == kPolygons; }
-
-  /// Of the codes of the zones.
-  GridSource CurrentSource() const override;
-  /// What the source holds; nothing is asked for a uniform distribution.
-  FoundZones FindZones() const { return Finder()({}); }
-  ZoneFinder Finder() const;
-  /// What `SyncZones` would do.
-  SyncPlan PlanZones(const FoundZones& found);
-  /// Brings the zones in step with the source.
-  SyncResult SyncZones(const FoundZones& found);
-  SyncResult SyncZones() { return SyncZones(FindZones()); }
-
-  std::vector<std::string> GetZoneTitles() const { return ZoneItemTitles(*this); }
-  /// The zone of that name, or of that code; null when there is none. By code the search ends at the first zone whose
-  /// identity gives a number below 1.
-  CFMSEKvfGroupBase* SelectZoneByName(const std::string& name) const;
-  CFMSEKvfGroupBase* SelectZoneByCode(int code) const;
-
+  std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
   void ReadData(KvfNode* section) override;
   void WriteData(KvfFile* file) override;
 
@@ -107,9 +77,7 @@ class CodedZonesKvf : public CFMSEKvfBase, public CellValues {
   void ExchangeKeys(KeyExchange& keys) override;
 
  private:
-  const char* countKey_;
-  CTvnData2DNdsFile* gridFile_;
-  CData2DShpFile* shapeFile_;
+  const CodedZonesKind& kind_;
 };
 
 /// A subcatchment.
@@ -127,8 +95,6 @@ class CSubcatchmentPropKvf : public CodedZoneProp {
 class CSubcatchmentKvf : public CodedZonesKvf {
  public:
   explicit CSubcatchmentKvf(CYbSEKvfBase* parent);
-
-  std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
 };
 inline constexpr ImportantName<CSubcatchmentKvf> kSubcatchments{"SUBCATCHMENT"};
 

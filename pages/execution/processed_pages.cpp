@@ -12,6 +12,7 @@
 #include "data/datafile.h"
 #include "document/flow_model_document.h"
 #include "execution/pages.h"
+#include "pages/parts/file_controls.h"
 #include "pages/parts/plot_content.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"

@@ -8,7 +8,7 @@
 #include "data/grid_files.h"
 #include "data/series_csv.h"
 #include "data/series_file.h"
-#include "pages/parts/plot_content.h"
+#include "pages/parts/file_controls.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"

@@ -8,9 +8,7 @@
 #include <limits>
 
 #include <fmt/format.h>
-#include <fmt/ranges.h>
 
-#include "overlays/grid_state.h"
 #include "overlays/overlays.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
@@ -124,8 +122,6 @@ std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item
   });
 }
 
-const COverlaysKvf* OverlaysOf(const CYbSEKvfBase& node) { return node.Important(kOverlays); }
-
 /// Grids and shapes of a list of layers that are shown.
 void AddLayers(const COverlayListKvf& list, MapContent& map) {
   for (int number = 1; number <= list.GetItemCount(); ++number) {
@@ -153,7 +149,7 @@ MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRo
   MapContent map;
   map.message = problem;
   if (!grid) return map;
-  const COverlaysKvf* overlays = OverlaysOf(node);
+  const COverlaysKvf* overlays = node.Important(kOverlays);
   if (overlays) AddLayers(overlays->Background(), map);
   GridLayer layer;
   layer.isCodes = grid->ItemType() == quantity::kCode;
@@ -215,113 +211,6 @@ SeriesContent FileChart(const DataFileNode& node) {
 std::string ShortUnitOf(const DataItem& item) {
   const Unit* unit = FindUnit(item.unitKey);
   return unit ? std::string(unit->abbreviation) : item.unitText;
-}
-
-Control& UnitKeyChoice(PageForm& form, const std::string& label, const char* key, int& unitKey, int itemType) {
-  const ItemType* type = FindItemType(itemType);
-  std::vector<int> keys;
-  std::vector<std::string> texts;
-  for (const int unit : type ? type->unitKeys : std::span<const int>()) {
-    keys.push_back(unit);
-    texts.emplace_back(FindUnit(unit)->text);
-  }
-  return form
-      .Choice(
-          label,
-          [&unitKey, keys] {
-            const auto found = std::ranges::find(keys, unitKey);
-            return found == keys.end() ? unitKey : static_cast<int>(found - keys.begin());
-          },
-          [&unitKey, keys](int choice) {
-            if (choice >= 0 && choice < static_cast<int>(keys.size())) unitKey = keys[static_cast<std::size_t>(choice)];
-          },
-          std::move(texts))
-      .Key(key);
-}
-
-Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& owner) {
-  return form
-      .Choice(
-          "Fill Gaps with:",
-          [&filler, &owner] {
-            const std::vector<std::string> names = ZoneItemTitles(owner);
-            return static_cast<int>(std::ranges::find(names, filler) - names.begin());
-          },
-          [&filler, &owner](int choice) {
-            const std::vector<std::string> names = ZoneItemTitles(owner);
-            if (choice >= 0 && choice < static_cast<int>(names.size()))
-              filler = names[static_cast<std::size_t>(choice)];
-          },
-          [&filler, &owner] {
-            std::vector<std::string> options = ZoneItemTitles(owner);
-            // A name that nobody bears stands behind the others until another one is chosen.
-            if (std::ranges::find(options, filler) == options.end())
-              options.push_back(filler.empty() ? filler : filler + " (not in the list)");
-            return options;
-          })
-      .Key("ShapeGapFillName");
-}
-
-void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner) {
-  const std::vector<std::string> names = ZoneItemTitles(owner);
-  if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
-}
-
-FoundZones FindWatched(Host& host, const ZoneFinder& finder) {
-  const auto finding =
-      std::make_shared<Computed<FoundZones>>("Looking for zones", [finder](FoundZones& found, ProgressPart progress) {
-        found = finder(progress);
-        return FileResult{progress.IsCancelled() ? kCancelled : "", {}};
-      });
-  if (host.Compute(finding) && finding->Result()) return *finding->Result();
-  FoundZones none;
-  none.unreadable = finding->IsDone() ? finding->Problem() : "The file was not read to its end.";
-  return none;
-}
-
-int SyncOrAsk(Host& host, const FoundZones& found, const SyncPlan& plan, const std::function<SyncResult()>& sync) {
-  if (!found.unreadable.empty()) {
-    host.Tell(fmt::format("{}\n\nThe zones stay as they are.", found.unreadable), Host::Icon::Warning);
-    return kDataChanged;
-  }
-  if (!found.message.empty()) {
-    host.Tell(found.message, Host::Icon::Warning);
-    return kDataChanged;
-  }
-  if (!plan.editedRemoved.empty()) {
-    std::vector<std::string> names;
-    for (const CFMSEKvfGroupBase* zone : plan.editedRemoved) names.push_back(zone->GetStationName());
-    const std::string question = fmt::format(
-        "These hold values of yours and would be removed:\n\n{}\n\nRemove them? With No all stay as they are.",
-        fmt::join(names, "\n"));
-    if (host.Ask(question, Host::Icon::Question, Host::Buttons::YesNo) != Host::Answer::Yes) return kDataChanged;
-  }
-  switch (sync()) {
-    case kAdded:
-      return kItemAdded | kOrderChanged;
-    case kRemoved:
-      return kItemDeleted | kOrderChanged;
-    case kAddedAndRemoved:
-      return kItemDeleted | kItemAdded | kOrderChanged;
-    case kReordered:
-      return kOrderChanged;
-    case kNothing:
-      break;
-  }
-  return kDataChanged;
-}
-
-void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const FileName& file, std::optional<int> item) {
-  if (const COverlaysKvf* overlays = OverlaysOf(node)) {
-    if (PrepareGridState(*overlays, file, item, context.host).empty()) return;
-  }
-  if (context.openDataFile) context.openDataFile(file.Absolute());
-}
-
-bool MayCreateFile(const PageContext& context) {
-  if (!context.document.PathName().empty()) return true;
-  context.host.Tell("You must save your setup before you can create a file.", Host::Icon::Warning);
-  return false;
 }
 
 }  // namespace tervane

@@ -3,6 +3,7 @@
 #include "pages/spatial/data2d_pages.h"
 
 #include "pages/parts/create_dialogs.h"
+#include "pages/parts/file_controls.h"
 #include "pages/parts/plot_content.h"
 #include "platform/item_types.h"
 #include "platform/units.h"

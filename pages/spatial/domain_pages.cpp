@@ -8,6 +8,7 @@
 #include "forms/map_question.h"
 #include "geometry/cart.h"
 #include "pages/parts/create_dialogs.h"
+#include "pages/parts/file_controls.h"
 #include "pages/parts/plot_content.h"
 #include "platform/item_types.h"
 #include "platform/units.h"

@@ -1,0 +1,193 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/parts/zone_controls.h"
+
+#include <algorithm>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include "pages/parts/create_dialogs.h"
+#include "pages/parts/plot_content.h"
+#include "platform/item_types.h"
+
+namespace tervane {
+
+namespace {
+
+/// Which zone fills the gaps between polygons.
+Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& owner) {
+  return form
+      .Choice(
+          "Fill Gaps with:",
+          [&filler, &owner] {
+            const std::vector<std::string> names = ZoneItemTitles(owner);
+            return static_cast<int>(std::ranges::find(names, filler) - names.begin());
+          },
+          [&filler, &owner](int choice) {
+            const std::vector<std::string> names = ZoneItemTitles(owner);
+            if (choice >= 0 && choice < static_cast<int>(names.size()))
+              filler = names[static_cast<std::size_t>(choice)];
+          },
+          [&filler, &owner] {
+            std::vector<std::string> options = ZoneItemTitles(owner);
+            // A name that nobody bears stands behind the others until another one is chosen.
+            if (std::ranges::find(options, filler) == options.end())
+              options.push_back(filler.empty() ? filler : filler + " (not in the list)");
+            return options;
+          })
+      .Key("ShapeGapFillName");
+}
+
+/// Where nobody bears that name, the first fills them.
+void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner) {
+  const std::vector<std::string> names = ZoneItemTitles(owner);
+  if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
+}
+
+/// Looks for zones while the user may watch and give up; then they are unreadable.
+FoundZones FindWatched(Host& host, const ZoneFinder& finder) {
+  const auto finding =
+      std::make_shared<Computed<FoundZones>>("Looking for zones", [finder](FoundZones& found, ProgressPart progress) {
+        found = finder(progress);
+        return FileResult{progress.IsCancelled() ? kCancelled : "", {}};
+      });
+  if (host.Compute(finding) && finding->Result()) return *finding->Result();
+  FoundZones none;
+  none.unreadable = finding->IsDone() ? finding->Problem() : "The file was not read to its end.";
+  return none;
+}
+
+/// Brings zones in step with what was found, asking before work of the user's would be lost. Gives the hints of what
+/// changed.
+int SyncOrAsk(Host& host, const FoundZones& found, ZoneSource& source) {
+  if (!found.unreadable.empty()) {
+    host.Tell(fmt::format("{}\n\nThe zones stay as they are.", found.unreadable), Host::Icon::Warning);
+    return kDataChanged;
+  }
+  if (!found.message.empty()) {
+    host.Tell(found.message, Host::Icon::Warning);
+    return kDataChanged;
+  }
+  if (const SyncPlan plan = source.PlanZones(found); !plan.editedRemoved.empty()) {
+    std::vector<std::string> names;
+    for (const CFMSEKvfGroupBase* zone : plan.editedRemoved) names.push_back(zone->GetStationName());
+    const std::string question = fmt::format(
+        "These hold values of yours and would be removed:\n\n{}\n\nRemove them? With No all stay as they are.",
+        fmt::join(names, "\n"));
+    if (host.Ask(question, Host::Icon::Question, Host::Buttons::YesNo) != Host::Answer::Yes) return kDataChanged;
+  }
+  switch (source.SyncZones(found)) {
+    case kAdded:
+      return kItemAdded | kOrderChanged;
+    case kRemoved:
+      return kItemDeleted | kOrderChanged;
+    case kAddedAndRemoved:
+      return kItemDeleted | kItemAdded | kOrderChanged;
+    case kReordered:
+      return kOrderChanged;
+    case kNothing:
+      break;
+  }
+  return kDataChanged;
+}
+
+}  // namespace
+
+int SyncWithSource(Host& host, ZoneSource& source) {
+  if (!source.HasZones()) return kDataChanged;
+  const FoundZones found = FindWatched(host, source.Finder());
+  const int hint = SyncOrAsk(host, found, source);
+  KeepGapFill(source.ShapeGapFillName, source.Owner());
+  return hint;
+}
+
+void RefreshZones(const CYbSEDlgBase& page, ZoneSource& source, const std::string& action) {
+  if (source.IsInForce()) page.UpdateDoc(SyncWithSource(page.Outside(), source) | kRefreshPlots, action);
+}
+
+void DescribeZoneSource(PageForm& form, const CYbSEDlgBase& page, ZoneSource& source, const ZoneSourceWords& words) {
+  const Condition byCodes = source.ByCodes(), byPolygons = source.ByPolygons();
+  const auto sync = [&page, &source] { return SyncWithSource(page.Outside(), source); };
+  form.DataFile(words.grid, source.GridFile())
+      .Filter(words.gridFilter)
+      .DefaultExtension("nds2")
+      .ShownWhen(byCodes)
+      .Then(sync);
+  Control& edit =
+      form.Button("Edit...", [&page, &source] { EditDataFile(page.Context(), page.Node(), source.GridFile().File); })
+          .ShownWhen(byCodes);
+  if (words.isEditBeside) edit.Beside();
+  form.Button("Create...",
+              [&page, &source, sync] {
+                CData2DNdsCreateDlg dialog(page.Context(), 1.0F, page.Node(), quantity::kCode);
+                if (const auto file = dialog.Run()) {
+                  source.GridFile().Choose(*file);
+                  page.UpdateDoc(sync(), "Create Grid File");
+                }
+              })
+      .Beside()
+      .ShownWhen(byCodes);
+  form.ShapeFile(words.shape, source.ShapeFile())
+      .Filter(words.shapeFilter)
+      .DefaultExtension("shp")
+      .ShownWhen(byPolygons)
+      .Then(sync);
+  form.Shown("Item Name:", [&source] { return source.ShapeFile().Attribute(); }).ShownWhen(byPolygons);
+  UnitKeyChoice(form, words.units, "ShapeAxisUnit", source.ShapeAxisUnit, quantity::kMapCoordinate)
+      .ShownWhen(byPolygons);
+  if (source.SourceKind().hasGapFill)
+    GapFillChoice(form, source.ShapeGapFillName, source.Owner()).ShownWhen(byPolygons);
+}
+
+MapContent ZoneMap(const ZoneSource& source, const CFMSEKvfGroupBase* highlighted) {
+  if (source.UsesPolygons()) {
+    MapContent map = ShapeFileMap(source.ShapeFile(), source.ShapeAxisUnit);
+    if (highlighted) LetStandOut(map, {.name = highlighted->GetStationId()});
+    return map;
+  }
+  MapContent map = FileMap(source.GridFile());
+  if (!map.grids.empty()) map.grids.front().isCodes = true;
+  if (highlighted) LetStandOut(map, {.code = static_cast<float>(highlighted->StationCode())});
+  return map;
+}
+
+void GoToPickedZone(MapContent& map, const CYbSEDlgBase& page, const ZoneSource& source) {
+  map.picked = [&page, &source](const MapPick& pick) {
+    const CFMSEKvfGroupBase* zone = nullptr;
+    if (source.UsesGridCodes() && pick.value) zone = source.SelectZoneByCode(static_cast<int>(*pick.value));
+    if (source.UsesPolygons() && pick.shape) zone = source.SelectZoneByName(pick.shapeValue);
+    if (zone && page.Context().selectNode) page.Context().selectNode(*zone);
+  };
+}
+
+void ZoneName(PageForm& form, const std::string& label, CodedZoneProp& zone) {
+  form.Text(label, zone.NAME).Hint(kTreeRebuilt | kDataChanged).Then([&zone] {
+    return zone.SetAbbreviatedTitle(zone.NAME), 0;
+  });
+}
+
+void ZoneIdentity(PageForm& form, const std::string& zones, const CodedZoneProp& zone, const ZoneSource* source) {
+  const auto id = [&zone] { return zone.GRIDCODEID; };
+  form.Shown("Grid code value:", id).ShownWhen(fmt::format("the {} are grid codes", zones), [source] {
+    return source && source->UsesGridCodes();
+  });
+  form.Shown("Polygon:", id).ShownWhen(fmt::format("the {} are polygons", zones), [source] {
+    return source && source->UsesPolygons();
+  });
+}
+
+void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words) {
+  const auto sync = [&page, &zones] { return SyncWithSource(page.Outside(), zones); };
+  if (zones.Kind().distribution) form.Choice("Spatial Distribution:", zones.DistributionType).Then(sync);
+  form.Choice("Data Type:", zones.Type).ShownWhen(zones.InForce()).Then(sync);
+  DescribeZoneSource(form, page, zones, words);
+  form.Map([&page, &zones] {
+        MapContent map = ZoneMap(zones, nullptr);
+        GoToPickedZone(map, page, zones);
+        return map;
+      })
+      .ShownWhen(zones.InForce());
+}
+
+}  // namespace tervane
