@@ -2,9 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "execution/processed_pages.h"
 
-#include <array>
 #include <cstdlib>
-#include <string_view>
 
 #include <fmt/format.h>
 #include <fmt/printf.h>
@@ -13,12 +11,13 @@
 
 namespace tervane {
 
-CPreprocessedDataEntity::CPreprocessedDataEntity(const PageClass* pageClass, PreprocessedPage page,
+CPreprocessedDataEntity::CPreprocessedDataEntity(const PreprocessedKind& kind, PreprocessedPage page,
                                                  CYbSEKvfBase* parent)
     : CYbSEKvfBase(page.title, page.title, parent),
-      pageClass_(pageClass),
+      pageClass_(kind.page),
       values_(std::move(page.values)),
       folder_(std::move(page.folder)) {
+  SetClassName(kind.className);
   if (!page.abbreviatedTitle.empty()) SetAbbreviatedTitle(std::move(page.abbreviatedTitle));
 }
 
@@ -44,30 +43,25 @@ std::string CPreprocessedHTML::GetFile() const { return ResolvedPath(GetHtml(), 
 
 namespace {
 
-/// A kind of page: the section that holds its content, and its node.
-struct PageKind {
-  std::string_view section;
-  CYbSEKvfBase* (*make)(PreprocessedPage page, CYbSEKvfBase& parent);
-};
-
-template <class Node>
-CYbSEKvfBase* Make(PreprocessedPage page, CYbSEKvfBase& parent) {
-  return parent.NewChild<Node>(std::move(page));
-}
-
 /// Of several contents in one page the first of this list counts.
-constexpr std::array kKinds{
-    PageKind{"BLANK", Make<CPreprocessedBlankKvf>},
-    PageKind{"NDS0_PLOT", Make<CPreprocessedNDS0_PLOTkvf>},
-    PageKind{"NDS1_PLOT", Make<CPreprocessedNDS1_PLOTkvf>},
-    PageKind{"NDS2_PLOT", Make<CPreprocessedNDS2_PLOTkvf>},
-    PageKind{"NDS3_PLOT", Make<CPreprocessedNDS3_PLOTkvf>},
-    PageKind{"TEXT", Make<CPreprocessedTEXTkvf>},
-    PageKind{"TXT_FILE", Make<CPreprocessedTXT_FILEkvf>},
-    PageKind{"HTML", Make<CPreprocessedHTML>},
-    PageKind{"SHAPE_PLOT", Make<CPreprocessedSHAPE_PLOTkvf>},
-    PageKind{"RIVER_PLOT", Make<CPreprocessedRIVER_LINKS_PLOTkvf>},
+constexpr PreprocessedKind kKinds[] = {
+    {"BLANK", "CPreprocessedBlankKvf", &kPreprocessedBlankPage},
+    {"NDS0_PLOT", "CPreprocessedNDS0_PLOTkvf", &kPreprocessedNds0Page},
+    {"NDS1_PLOT", "CPreprocessedNDS1_PLOTkvf", &kPreprocessedNds1Page},
+    {"NDS2_PLOT", "CPreprocessedNDS2_PLOTkvf", &kPreprocessedNds2Page},
+    {"NDS3_PLOT", "CPreprocessedNDS3_PLOTkvf", &kPreprocessedNds3Page},
+    {"TEXT", "CPreprocessedTEXTkvf", &kPreprocessedTextPage},
+    {"TXT_FILE", "CPreprocessedTXT_FILEkvf", &kPreprocessedTextFilePage},
+    {"HTML", "CPreprocessedHTML", &kHelpPage},
+    {"SHAPE_PLOT", "CPreprocessedSHAPE_PLOTkvf", &kPreprocessedShapePage},
+    // The links between river and grid: grids show them.
+    {"RIVER_PLOT", "CPreprocessedRIVER_LINKS_PLOTkvf", nullptr},
 };
+
+CYbSEKvfBase& MakeNode(const PreprocessedKind& kind, PreprocessedPage page, CYbSEKvfBase& parent) {
+  if (kind.page == &kHelpPage) return *parent.NewChild<CPreprocessedHTML>(std::move(page));
+  return *parent.NewChild<CPreprocessedDataEntity>(kind, std::move(page));
+}
 
 std::string TextOf(KvfParam* param) {
   if (kvfIsFilename(param)) return kvfGetFilename(param);
@@ -90,9 +84,9 @@ int BuildPreprocessedPages(KvfNode* section, const std::shared_ptr<const std::st
   page.folder = folder;
   kvfGetParam(section, "TITLE", &page.title, 1, 1);
   kvfGetParam(section, "Abbrev", &page.abbreviatedTitle, 1, 1);
-  const PageKind* kind = &kKinds.front();
+  const PreprocessedKind* kind = &kKinds[0];
   KvfNode* content = nullptr;
-  for (const PageKind& each : kKinds) {
+  for (const PreprocessedKind& each : kKinds) {
     content = kvfSectionByNameNum(section, each.section, 1);
     if (!content) continue;
     kind = &each;
@@ -101,7 +95,7 @@ int BuildPreprocessedPages(KvfNode* section, const std::shared_ptr<const std::st
   // A keyword that stands twice keeps its last value.
   for (int n = 1; KvfNode* keyword = kvfKeywordByNum(content, n); ++n)
     page.values[kvfGetName(keyword)] = TextOf(keyword);
-  CYbSEKvfBase& node = *kind->make(std::move(page), parent);
+  CYbSEKvfBase& node = MakeNode(*kind, std::move(page), parent);
   int made = 1;
   for (int n = 1; KvfNode* below = kvfSectionByNameNum(section, "PAGE", n); ++n)
     made += BuildPreprocessedPages(below, folder, node);

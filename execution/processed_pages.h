@@ -1,13 +1,14 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// The pages of a preprocessor's report as nodes: one class for each kind of page. They are made anew whenever the
-// report changes, are never saved, and undo knows nothing of them. docs/preprocessor-report.md tells the report's form.
+// The pages of a preprocessor's report as nodes: one row for each kind of page. They are made anew whenever the report
+// changes, are never saved, and undo knows nothing of them. docs/preprocessor-report.md tells the report's form.
 #pragma once
 
 #include <map>
 #include <memory>
 #include <string>
+#include <string_view>
 
 #include "core/kvf.h"
 #include "core/node.h"
@@ -25,13 +26,20 @@ struct PreprocessedPage {
   std::shared_ptr<const std::string> folder;
 };
 
-/// Any page with values.
+/// A kind of page: the section that holds its content, the name of its nodes, and what shows them.
+struct PreprocessedKind {
+  std::string_view section;
+  std::string_view className;
+  const PageClass* page;  ///< Null for what has no page of its own.
+};
+
+/// A page with values.
 class CPreprocessedDataEntity : public CYbSEKvfBase {
  public:
-  CPreprocessedDataEntity(const PageClass* pageClass, PreprocessedPage page, CYbSEKvfBase* parent);
+  CPreprocessedDataEntity(const PreprocessedKind& kind, PreprocessedPage page, CYbSEKvfBase* parent);
 
   /// The text of a key, empty where the report has none.
-  virtual const std::string& GetValue(const std::string& key) const;
+  const std::string& GetValue(const std::string& key) const;
   /// The text as a whole number: what stands in front of it, 0 where nothing does.
   int GetNumber(const std::string& key) const;
   /// The file that the key `Filename` names, absolute; empty where there is none.
@@ -46,69 +54,6 @@ class CPreprocessedDataEntity : public CYbSEKvfBase {
   const PageClass* pageClass_;
   std::map<std::string, std::string> values_;
   std::shared_ptr<const std::string> folder_;
-};
-
-/// A page that only holds others.
-class CPreprocessedBlankKvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedBlankKvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(&kPreprocessedBlankPage, std::move(page), parent) {}
-};
-
-/// A time series.
-class CPreprocessedNDS0_PLOTkvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedNDS0_PLOTkvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(&kPreprocessedNds0Page, std::move(page), parent) {}
-};
-
-/// Values along a line.
-class CPreprocessedNDS1_PLOTkvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedNDS1_PLOTkvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(&kPreprocessedNds1Page, std::move(page), parent) {}
-};
-
-/// A grid, with or without the river network.
-class CPreprocessedNDS2_PLOTkvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedNDS2_PLOTkvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(&kPreprocessedNds2Page, std::move(page), parent) {}
-};
-
-/// Layers of grids.
-class CPreprocessedNDS3_PLOTkvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedNDS3_PLOTkvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(&kPreprocessedNds3Page, std::move(page), parent) {}
-};
-
-/// A text that stands in the report.
-class CPreprocessedTEXTkvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedTEXTkvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(&kPreprocessedTextPage, std::move(page), parent) {}
-};
-
-/// A text file.
-class CPreprocessedTXT_FILEkvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedTXT_FILEkvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(&kPreprocessedTextFilePage, std::move(page), parent) {}
-};
-
-/// A shape file.
-class CPreprocessedSHAPE_PLOTkvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedSHAPE_PLOTkvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(&kPreprocessedShapePage, std::move(page), parent) {}
-};
-
-/// The links between river and grid. They have no page of their own: grids show them.
-class CPreprocessedRIVER_LINKS_PLOTkvf : public CPreprocessedDataEntity {
- public:
-  CPreprocessedRIVER_LINKS_PLOTkvf(PreprocessedPage page, CYbSEKvfBase* parent)
-      : CPreprocessedDataEntity(nullptr, std::move(page), parent) {}
 };
 
 /// A page of the help, or an HTML file beside the report.

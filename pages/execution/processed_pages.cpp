@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cstdlib>
 #include <iterator>
+#include <optional>
 #include <tuple>
 
 #include <fmt/format.h>
@@ -12,8 +13,13 @@
 #include "data/datafile.h"
 #include "document/flow_model_document.h"
 #include "execution/pages.h"
+#include "execution/processed_data.h"
+#include "execution/processed_pages.h"
+#include "execution/processed_river.h"
+#include "forms/plots.h"
 #include "pages/parts/file_controls.h"
 #include "pages/parts/plot_content.h"
+#include "pages/parts/section_tool.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"
@@ -29,9 +35,8 @@ constexpr int kElevation = 100180;
 const CPreprocessedDataEntity* ReportedTopography(const CYbSEKvfBase& page) {
   for (const CYbSEKvfBase* above = page.GetParent(); above; above = above->GetParent())
     for (const CYbSEKvfBase* child = above->GetFirstChild(); child; child = above->GetNextChild(child))
-      if (const auto* grid = dynamic_cast<const CPreprocessedNDS2_PLOTkvf*>(child);
-          grid && grid->GetTitle() == "Topography")
-        return grid;
+      if (child->GetDlgRuntimeClass(kProcessedDataTree) == &kPreprocessedNds2Page && child->GetTitle() == "Topography")
+        return dynamic_cast<const CPreprocessedDataEntity*>(child);
   return nullptr;
 }
 
@@ -46,41 +51,37 @@ CYbDateTime ParseListedDate(std::string_view text) {
   return {fields[0], fields[1], fields[2], fields[3], fields[4], fields[5]};
 }
 
-}  // namespace
+/// Which item of its file a page shows.
+int ItemOf(const CPreprocessedDataEntity& n) { return n.GetNumber("ItemNo"); }
 
-void CProcDataDlg::Describe(PageForm& form) {
-  const auto manager = [this] { return Node().Manager(); };
+/// Where the report lies, and what was read of it.
+void DescribeReport(PageForm& form, CProcDataKvf& n) {
+  const auto manager = [&n] { return n.Manager(); };
   form.ReadOnlyText("Report:", [manager] { return manager() ? manager()->Path() : std::string(); });
   form.Notice([manager] {
     return manager() ? manager()->StateText() : "The setup was never saved, so that nothing lies beside it.";
   });
 }
 
-void PreprocessedFilePage::DescribeFile(PageForm& form) {
-  form.ReadOnlyText("Filename:", [this] { return Node().GetFile(); });
+/// A page without content, which has pages below it.
+void DescribeNothing(PageForm& /*form*/, CPreprocessedDataEntity& /*n*/) {}
+
+/// The name of a page's file; of a line nothing else is shown.
+void DescribeFile(PageForm& form, CPreprocessedDataEntity& n) {
+  form.ReadOnlyText("Filename:", [&n] { return n.GetFile(); });
+}
+
+/// The button that opens the file of grids.
+void EditGridButton(PageForm& form, CPreprocessedDataEntity& n, const CYbSEDlgBase& page) {
+  form.Button("Edit...", [&n, &page] { EditDataFile(page.Context(), n, FileName(n.GetFile(), {}), ItemOf(n)); })
+      .ToolTip("Use grid editor to view preprocessed grid data");
 }
 
 // ---- Time series
 
-void CPreprocessedNDS0_PLOTDlg::Describe(PageForm& form) {
-  DescribeFile(form);
-  form.Button("Edit...",
-              [this] {
-                if (const std::string file = Node().GetFile(); !file.empty() && Context().openDataFile)
-                  Context().openDataFile(file);
-              })
-      .ToolTip("Use time series editor to view time series data");
-  form.Notice([this] {
-    std::string notice;
-    SeriesContent unused;
-    ReadPeriod(notice, unused);
-    return notice;
-  });
-  form.Chart([this] { return Chart(); });
-}
-
-void CPreprocessedNDS0_PLOTDlg::ReadPeriod(std::string& notice, SeriesContent& chart) const {
-  const std::string &start = Node().GetValue("StartDate"), &end = Node().GetValue("EndDate");
+/// Puts the period that the report tells into the chart; nothing, with the reason in `notice`, where it is none.
+void ReadPeriod(const CPreprocessedDataEntity& n, std::string& notice, SeriesContent& chart) {
+  const std::string &start = n.GetValue("StartDate"), &end = n.GetValue("EndDate");
   if (start.empty() || end.empty()) return;
   const CYbDateTime from = ParseListedDate(start), to = ParseListedDate(end);
   for (const auto& [key, text, date] : {std::tuple("StartDate", start, from), std::tuple("EndDate", end, to)})
@@ -89,35 +90,69 @@ void CPreprocessedNDS0_PLOTDlg::ReadPeriod(std::string& notice, SeriesContent& c
   if (notice.empty()) chart.period = {from, to};
 }
 
-SeriesContent CPreprocessedNDS0_PLOTDlg::Chart() const {
+SeriesContent SeriesChart(const CPreprocessedDataEntity& n) {
   CTvnData0DFile file("TIME_SERIES_FILE", nullptr);
-  file.File = FileName(Node().GetFile(), {});
-  file.Items = {Item()};
+  file.File = FileName(n.GetFile(), {});
+  file.Items = {ItemOf(n)};
   SeriesContent chart = FileChart(file);
   if (file.File.IsEmpty()) chart.message = kNoFile;
   std::string notice;
-  ReadPeriod(notice, chart);
+  ReadPeriod(n, notice, chart);
   return chart;
+}
+
+/// A time series with the simulation period.
+void DescribeSeries(PageForm& form, CPreprocessedDataEntity& n, CYbSEDlgBase& page) {
+  DescribeFile(form, n);
+  form.Button("Edit...",
+              [&n, &page] {
+                if (const std::string file = n.GetFile(); !file.empty() && page.Context().openDataFile)
+                  page.Context().openDataFile(file);
+              })
+      .ToolTip("Use time series editor to view time series data");
+  form.Notice([&n] {
+    std::string notice;
+    SeriesContent unused;
+    ReadPeriod(n, notice, unused);
+    return notice;
+  });
+  form.Chart([&n] { return SeriesChart(n); });
 }
 
 // ---- Grids
 
-void CProcDataGridAndRiverPlot::AddLines(ShapeLayer layer) {
+/// Adds a part of the river network to the map of a grid.
+void AddRiver(MapContent& map, ShapeLayer layer) {
   // The grid stays in view, wherever a river may lead.
-  if (!map_.grids.empty() && !map_.area) map_.area = map_.grids.front().grid->GetEnvelope();
-  map_.shapes.push_back(std::move(layer));
+  if (!map.grids.empty() && !map.area) map.area = map.grids.front().grid->GetEnvelope();
+  map.shapes.push_back(std::move(layer));
 }
 
-void CProcDataGridAndRiverPlot::Add(const CProcDataRiverLinkOverlay& links) {
-  AddLines({links.Lines(), {}, CProcDataRiverLinkOverlay::kColor, CProcDataRiverLinkOverlay::kPenWidth});
-}
+/// A grid, with the river network where the report asks for it.
+class CPreprocessedNDS2_PLOT : public PageOf<CPreprocessedDataEntity> {
+ public:
+  using PageOf::PageOf;
 
-void CProcDataGridAndRiverPlot::Add(const CProcDataRiverPointOverlay& points) { AddLines({points.Lines(), {}}); }
+  void SetData() override;
+  /// Reads the river network again.
+  void OnRefresh() override { ReadRiver(); }
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  MapContent Map();
+  void ReadRiver();
+
+  bool isRiverRead_ = false;
+  std::string riverProblem_;
+  std::optional<CProcDataRiverLinkOverlay> links_;
+  std::optional<CProcDataRiverPointOverlay> points_;
+};
 
 void CPreprocessedNDS2_PLOT::Describe(PageForm& form) {
-  DescribeFile(form);
-  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), FileName(Node().GetFile(), {}), Item()); })
-      .ToolTip("Use grid editor to view preprocessed grid data");
+  DescribeFile(form, Node());
+  EditGridButton(form, Node(), *this);
   form.Notice([this] { return riverProblem_; });
   form.Map([this] { return Map(); });
 }
@@ -125,8 +160,6 @@ void CPreprocessedNDS2_PLOT::Describe(PageForm& form) {
 void CPreprocessedNDS2_PLOT::SetData() {
   if (!isRiverRead_) ReadRiver();
 }
-
-void CPreprocessedNDS2_PLOT::OnRefresh() { ReadRiver(); }
 
 void CPreprocessedNDS2_PLOT::ReadRiver() {
   isRiverRead_ = true;
@@ -149,19 +182,46 @@ void CPreprocessedNDS2_PLOT::ReadRiver() {
 MapContent CPreprocessedNDS2_PLOT::Map() {
   const std::string path = Node().GetFile();
   if (path.empty()) return GridMap(Node(), nullptr, kNoFile);
-  MapContent map = GridFileMap(Node(), path, Item());
+  MapContent map = GridFileMap(Node(), path, ItemOf(Node()));
   // A network alone would hide why there is no grid.
   if (map.grids.empty()) return map;
-  CProcDataGridAndRiverPlot plot(std::move(map));
-  if (links_) plot.Add(*links_);
-  if (points_) plot.Add(*points_);
-  return plot.Take();
+  if (links_)
+    AddRiver(map, {links_->Lines(), {}, CProcDataRiverLinkOverlay::kColor, CProcDataRiverLinkOverlay::kPenWidth});
+  if (points_) AddRiver(map, {points_->Lines(), {}});
+  return map;
 }
 
 // ---- Layers
 
+/// One of several layers of grids, counted from the top. Elevations are bottoms of layers, which a section shows below
+/// the topography of the report.
+class CPreprocessedNDS3_PLOTDlg : public PageOf<CPreprocessedDataEntity> {
+ public:
+  CPreprocessedNDS3_PLOTDlg(CYbSEKvfBase& node, PageContext context)
+      : PageOf(node, std::move(context)), section_(Context().syncSoon) {}
+
+  void SetData() override;
+  /// Looks at the file's layers again.
+  void OnRefresh() override;
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  bool HasFixedLayer() const { return !Node().GetValue("LayerNo").empty(); }
+  MapContent Map() const;
+  SectionContent Section() const;
+
+  SectionTool section_;
+  bool isRead_ = false;
+  bool areElevations_ = false;
+  int layers_ = 0;
+  int selection_ = 0;  ///< 0 for the top.
+  std::string problem_;
+};
+
 void CPreprocessedNDS3_PLOTDlg::Describe(PageForm& form) {
-  DescribeFile(form);
+  DescribeFile(form, Node());
   form.Choice(
           "Layer:", [this] { return selection_; }, [this](int layer) { selection_ = layer; },
           [this] {
@@ -172,8 +232,7 @@ void CPreprocessedNDS3_PLOTDlg::Describe(PageForm& form) {
           })
       .EnabledWhen("the report leaves the layer open", [this] { return !HasFixedLayer(); })
       .Hint(kViewOnly);
-  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), FileName(Node().GetFile(), {}), Item()); })
-      .ToolTip("Use grid editor to view preprocessed grid data");
+  EditGridButton(form, Node(), *this);
   const Condition areLayers = Sentence("the file has layers", [this] { return areElevations_ && layers_ > 0; });
   section_.DescribeButtons(form, areLayers);
   form.Map([this] { return Map(); });
@@ -190,7 +249,7 @@ void CPreprocessedNDS3_PLOTDlg::SetData() {
   const std::string path = Node().GetFile();
   problem_ = path.empty() ? kNoFile : file.Open(path);
   if (problem_.empty()) {
-    const int number = Item(), count = static_cast<int>(file.Items().size());
+    const int number = ItemOf(Node()), count = static_cast<int>(file.Items().size());
     if (number < 1 || number > count)
       problem_ = fmt::format("{}: there is no item {}: the file has {}", path, number, count);
     else if (const DataItem& item = file.Items()[static_cast<std::size_t>(number - 1)]; item.dimensions != 3)
@@ -212,7 +271,7 @@ void CPreprocessedNDS3_PLOTDlg::OnRefresh() {
 MapContent CPreprocessedNDS3_PLOTDlg::Map() const {
   if (layers_ == 0) return GridMap(Node(), nullptr, problem_);
   // The file counts its layers from the bottom.
-  MapContent map = GridFileMap(Node(), Node().GetFile(), Item(), {0, layers_ - selection_ - 1});
+  MapContent map = GridFileMap(Node(), Node().GetFile(), ItemOf(Node()), {0, layers_ - selection_ - 1});
   section_.PutOn(map);
   return map;
 }
@@ -231,46 +290,45 @@ SectionContent CPreprocessedNDS3_PLOTDlg::Section() const {
   };
   section.ground = take(GridFileMap(*topography, topography->GetFile(), topography->GetNumber("ItemNo")));
   for (int layer = 1; layer <= layers_; ++layer)
-    if (auto bottom = take(GridFileMap(Node(), Node().GetFile(), Item(), {0, layers_ - layer})))
+    if (auto bottom = take(GridFileMap(Node(), Node().GetFile(), ItemOf(Node()), {0, layers_ - layer})))
       section.surfaces.push_back({fmt::format("Computational Layer {}", layer), std::move(bottom)});
   return section;
 }
 
 // ---- Texts and shapes
 
-void CPreprocessedTextDlg::Describe(PageForm& form) {
-  form.TextView("", [this] { return Replaced(Replaced(Node().GetValue("Text"), "\\n", "\r\n"), "\\r", "\r"); });
+/// A text of the report.
+void DescribeText(PageForm& form, CPreprocessedDataEntity& n) {
+  form.TextView("", [&n] { return Replaced(Replaced(n.GetValue("Text"), "\\n", "\r\n"), "\\r", "\r"); });
 }
 
-void CPreprocessedTXTFILEDlg::Describe(PageForm& form) {
-  DescribeFile(form);
-  form.TextFile([this] { return Node().GetFile(); });
+void DescribeTextFile(PageForm& form, CPreprocessedDataEntity& n) {
+  DescribeFile(form, n);
+  form.TextFile([&n] { return n.GetFile(); });
 }
 
-void CPreprocessedSHAPE_PLOTDlg::Describe(PageForm& form) {
-  DescribeFile(form);
-  form.Map([this] {
+void DescribeShapes(PageForm& form, CPreprocessedDataEntity& n) {
+  DescribeFile(form, n);
+  form.Map([&n] {
     CData2DShpFile file(nullptr);
-    file.File = FileName(Node().GetFile(), {});
-    const int unit = Node().GetNumber("enuAxisUnit");
+    file.File = FileName(n.GetFile(), {});
+    const int unit = n.GetNumber("enuAxisUnit");
     MapContent map = ShapeFileMap(file, unit ? unit : BaseUnit(*FindItemType(quantity::kMapCoordinate)).key);
     if (file.File.IsEmpty()) map.message = kNoFile;
     return map;
   });
 }
 
-namespace {
-
 constexpr PageRow kPages[] = {
-    PageIs<CProcDataDlg, CProcDataKvf>(kProcDataPage),
-    PageIs<CPreprocessedBlankDlg, CPreprocessedDataEntity>(kPreprocessedBlankPage),
-    PageIs<CPreprocessedNDS0_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedNds0Page),
-    PageIs<CPreProcessedNDS1_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedNds1Page),
+    DescribedBy<DescribeReport>(kProcDataPage),
+    DescribedBy<DescribeNothing>(kPreprocessedBlankPage),
+    DescribedBy<DescribeSeries>(kPreprocessedNds0Page),
+    DescribedBy<DescribeFile>(kPreprocessedNds1Page),
     PageIs<CPreprocessedNDS2_PLOT, CPreprocessedDataEntity>(kPreprocessedNds2Page),
     PageIs<CPreprocessedNDS3_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedNds3Page),
-    PageIs<CPreprocessedTextDlg, CPreprocessedDataEntity>(kPreprocessedTextPage),
-    PageIs<CPreprocessedTXTFILEDlg, CPreprocessedDataEntity>(kPreprocessedTextFilePage),
-    PageIs<CPreprocessedSHAPE_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedShapePage),
+    DescribedBy<DescribeText>(kPreprocessedTextPage),
+    DescribedBy<DescribeTextFile>(kPreprocessedTextFilePage),
+    DescribedBy<DescribeShapes>(kPreprocessedShapePage),
 };
 
 }  // namespace

@@ -10,6 +10,7 @@
 #include <gmock/gmock.h>
 
 #include "document/edit_session.h"
+#include "forms/plots.h"
 #include "pages/tree_entries.h"
 #include "platform/text.h"
 #include "tests/support/page_driver.h"
