@@ -1,0 +1,110 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/parts/zone_controls.h"
+
+#include <fmt/format.h>
+#include <gmock/gmock.h>
+
+#include "spatial/pages.h"
+#include "tests/support/data_files.h"
+#include "tests/support/page_driver.h"
+#include "tests/support/temp_folder.h"
+
+namespace tervane {
+namespace {
+
+using testing::ElementsAre;
+
+constexpr KeyChoice kWithNone[] = {{-1, "None"}, {0, "Grid codes (.nds2)"}, {1, "Polygons (.shp)"}};
+constexpr KeyChoice kOnlyCodes[] = {{0, "Grid codes (.nds2)"}, {1, "Polygons (.shp)", false}};
+constexpr ZoneSourceWords kWords{.grid = "Areas File:", .shapeFilter = "Shapes (*.shp) |*.shp||"};
+
+class AreaZone : public CodedZoneProp {
+ public:
+  explicit AreaZone(CYbSEKvfBase* parent) : CodedZoneProp(kZoneKeys, "Area", "Area", parent) {}
+};
+
+constexpr CodedZonesKind KindOf(ZoneSourceKind source, std::optional<int> distribution) {
+  return {.className = "Areas",
+          .title = "Areas",
+          .section = "Areas",
+          .source = source,
+          .distribution = distribution,
+          .makeZone = source.countKey.empty() ? nullptr : MakeZone<AreaZone>,
+          .page = &kSubcatchmentPage};
+}
+constexpr CodedZonesKind kUsual = KindOf({.countKey = "NO_AREAS"}, 0);
+constexpr CodedZonesKind kAlwaysDistributed =
+    KindOf({.types = kWithNone, .type = ZoneSource::kNone, .hasGapFill = false, .countKey = "NO_AREAS"}, std::nullopt);
+constexpr CodedZonesKind kMapOnly = KindOf({.types = kOnlyCodes, .hasGapFill = false}, 1);
+
+class ZoneControls : public testing::Test {
+ protected:
+  std::unique_ptr<CYbSEDlgBase> PageOfKind(const CodedZonesKind& kind) {
+    node = document.Root().NewChild<CodedZonesKvf>(kind);
+    auto page = std::make_unique<ZonesPage<kWords>>(
+        *node, PageContext{document, host, [this](int hint, const std::string& action, const void*) {
+                             changes.push_back(fmt::format("{} {}", hint, action));
+                           }});
+    page->Initialize();
+    return page;
+  }
+  static std::string Shown(const CYbSEDlgBase& page) {
+    std::string labels;
+    page.Form().ForEach([&](Control& control) {
+      if (control.IsShown() && !control.label.empty()) labels += control.label + " ";
+    });
+    return labels;
+  }
+
+  test::TempFolder folder;
+  CFlowModelDoc document;
+  test::ScriptedHost host;
+  std::vector<std::string> changes;
+  CodedZonesKvf* node = nullptr;
+};
+
+TEST_F(ZoneControls, ShowWhatTheKindOfSourceHasAndItsStateAsksFor) {
+  const std::string codes = "Areas File: Edit... Create... ",
+                    polygons = "Shape Distribution File: Item Name: Units of X- and Y-axises: ",
+                    distribution = "Spatial Distribution: ", type = "Data Type: ";
+  const struct {
+    const CodedZonesKind* kind;
+    int distribution, type;
+    std::string shown;
+  } cases[] = {
+      {&kUsual, 0, 0, distribution},
+      {&kUsual, 1, 0, distribution + type + codes},
+      {&kUsual, 1, 1, distribution + type + polygons + "Fill Gaps with: "},
+      {&kAlwaysDistributed, 1, -1, type},
+      {&kAlwaysDistributed, 1, 0, type + codes},
+      {&kAlwaysDistributed, 1, 1, type + polygons},
+      {&kMapOnly, 0, 0, distribution},
+      {&kMapOnly, 1, 0, distribution + type + codes},
+  };
+  for (const auto& c : cases) {
+    SCOPED_TRACE(fmt::format("{} {}", c.distribution, c.type));
+    const auto page = PageOfKind(*c.kind);
+    node->DistributionType = c.distribution;
+    node->Type = c.type;
+    EXPECT_EQ(Shown(*page), c.shown);
+  }
+}
+
+TEST_F(ZoneControls, AChosenFileBringsTheZonesInStepWhereThereAreAny) {
+  test::WriteCodes(folder.File("codes.nds2"), {4, 2});
+  for (const auto& [kind, zones, hint] :
+       {std::tuple(&kUsual, std::size_t{2}, kItemAdded | kOrderChanged), std::tuple(&kMapOnly, std::size_t{0}, 1)}) {
+    const auto page = PageOfKind(*kind);
+    node->DistributionType = CodedZonesKvf::kDistributed;
+    changes.clear();
+    page->Form().ForEach([&](Control& control) {
+      if (control.label == "Areas File:") page->Enter(control, folder.File("codes.nds2"));
+    });
+    EXPECT_EQ(ZoneItems(*node).size(), zones);
+    EXPECT_THAT(changes, ElementsAre(testing::StartsWith(fmt::format("{} ", hint | kDataChanged))));
+  }
+}
+
+}  // namespace
+}  // namespace tervane
