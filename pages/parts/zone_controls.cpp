@@ -98,7 +98,7 @@ int SyncWithSource(Host& host, ZoneSource& source) {
   if (!source.HasZones()) return kDataChanged;
   const FoundZones found = FindWatched(host, source.Finder());
   const int hint = SyncOrAsk(host, found, source);
-  KeepGapFill(source.ShapeGapFillName, source.Owner());
+  if (source.SourceKind().hasGapFill) KeepGapFill(source.ShapeGapFillName, source.Owner());
   return hint;
 }
 

@@ -93,16 +93,25 @@ TEST_F(ZoneControls, ShowWhatTheKindOfSourceHasAndItsStateAsksFor) {
 
 TEST_F(ZoneControls, AChosenFileBringsTheZonesInStepWhereThereAreAny) {
   test::WriteCodes(folder.File("codes.nds2"), {4, 2});
-  for (const auto& [kind, zones, hint] :
-       {std::tuple(&kUsual, std::size_t{2}, kItemAdded | kOrderChanged), std::tuple(&kMapOnly, std::size_t{0}, 1)}) {
-    const auto page = PageOfKind(*kind);
+  const struct {
+    const CodedZonesKind* kind;
+    std::size_t zones;
+    int hint;
+    const char* gapFill;
+  } cases[] = {{&kUsual, 2, kItemAdded | kOrderChanged, "Grid code = 2"},
+               {&kAlwaysDistributed, 2, kItemAdded | kOrderChanged, ""},
+               {&kMapOnly, 0, kDataChanged, ""}};
+  for (const auto& c : cases) {
+    const auto page = PageOfKind(*c.kind);
     node->DistributionType = CodedZonesKvf::kDistributed;
+    node->Type = ZoneSource::kGridCodes;
     changes.clear();
     page->Form().ForEach([&](Control& control) {
       if (control.label == "Areas File:") page->Enter(control, folder.File("codes.nds2"));
     });
-    EXPECT_EQ(ZoneItems(*node).size(), zones);
-    EXPECT_THAT(changes, ElementsAre(testing::StartsWith(fmt::format("{} ", hint | kDataChanged))));
+    EXPECT_EQ(ZoneItems(*node).size(), c.zones);
+    EXPECT_EQ(node->ShapeGapFillName, c.gapFill);
+    EXPECT_THAT(changes, ElementsAre(testing::StartsWith(fmt::format("{} ", c.hint | kDataChanged))));
   }
 }
 
