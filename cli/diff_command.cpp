@@ -31,11 +31,12 @@ std::string_view KindName(SetupDifference::Kind kind) {
 std::string Line(const SetupDifference& difference) {
   const std::string place =
       difference.key.empty() ? difference.path : fmt::format("{}:{}", difference.path, difference.key);
-  const auto value = [](const std::string& text, bool isDefault) {
-    return fmt::format("{}{}", text, isDefault ? " (default)" : "");
+  const auto value = [](const std::string& text, const std::string& meaning, bool isDefault) {
+    return fmt::format("{}{}{}", text, meaning.empty() ? "" : fmt::format(" [{}]", meaning),
+                       isDefault ? " (default)" : "");
   };
-  const std::string from = value(difference.from, difference.fromDefault);
-  const std::string to = value(difference.to, difference.toDefault);
+  const std::string from = value(difference.from, difference.fromMeaning, difference.fromDefault);
+  const std::string to = value(difference.to, difference.toMeaning, difference.toDefault);
   switch (difference.kind) {
     case SetupDifference::Kind::Changed:
       return fmt::format("{}: {} -> {}", place, from, to);
@@ -56,6 +57,8 @@ std::string Json(const SetupDifference& difference) {
                      {"kind", JsonQuoted(KindName(difference.kind))},
                      {"from", optional(difference.from)},
                      {"to", optional(difference.to)},
+                     {"fromMeaning", optional(difference.fromMeaning)},
+                     {"toMeaning", optional(difference.toMeaning)},
                      {"fromDefault", difference.fromDefault ? "true" : ""},
                      {"toDefault", difference.toDefault ? "true" : ""}});
 }

@@ -22,21 +22,33 @@ std::string Versions(const KeyInfo& key) {
   return text;
 }
 
+/// The choices with the numbers that the file holds, the unit and the range.
+std::string Facts(const KeyInfo& key) {
+  std::vector<std::string> parts;
+  for (const KeyChoice& choice : key.facts.choices)
+    parts.push_back(fmt::format("{} {}", choice.value + key.inFile, choice.text));
+  if (!key.facts.UnitText().empty()) parts.emplace_back(key.facts.UnitText());
+  if (key.facts.HasRange()) parts.push_back(key.facts.RangeText());
+  return fmt::format("{}", fmt::join(parts, "; "));
+}
+
 std::string WithoutTableMarks(std::string_view text) { return Replaced(text, "|", "\\|"); }
 
 void WriteMarkdown(const KeySection& section, std::ostream& out) {
   fmt::print(out, "\n## {}\n\n{} (`{}`)\n\n", section.path, section.title, section.className);
   if (section.isList) fmt::print(out, "A list: begins with `{}` (int).\n\n", CYbSEKvfListBaseInterface::kItemCountKey);
   if (section.keys.empty()) return;
-  fmt::print(out, "| Key | Type | Default | |\n|---|---|---|---|\n");
+  fmt::print(out, "| Key | Type | Default | Versions | Values |\n|---|---|---|---|---|\n");
   for (const KeyInfo& key : section.keys)
-    fmt::print(out, "| `{}` | {} | {} | {} |\n", key.key, key.type,
-               key.defaultValue.empty() ? "" : fmt::format("`{}`", WithoutTableMarks(key.defaultValue)), Versions(key));
+    fmt::print(out, "| `{}` | {} | {} | {} | {} |\n", key.key, key.type,
+               key.defaultValue.empty() ? "" : fmt::format("`{}`", WithoutTableMarks(key.defaultValue)), Versions(key),
+               WithoutTableMarks(Facts(key)));
 }
 
 void WriteText(const KeySection& section, std::ostream& out) {
   for (const KeyInfo& key : section.keys)
-    fmt::print(out, "{}:{}\t{}\t{}\t{}\n", section.path, Trimmed(key.key), key.type, key.defaultValue, Versions(key));
+    fmt::print(out, "{}:{}\t{}\t{}\t{}\t{}\n", section.path, Trimmed(key.key), key.type, key.defaultValue,
+               Versions(key), Facts(key));
 }
 
 int KeysCommand(bool markdown, Streams streams) {
@@ -47,7 +59,7 @@ int KeysCommand(bool markdown, Streams streams) {
                "was visited) and `IsDataUsedInSetup` (int, computed at every save).\n",
                CFlowModelDocVersionKvf::kWrittenVersion);
   else
-    fmt::print(streams.out, "PLACE\tTYPE\tDEFAULT\tVERSIONS\n");
+    fmt::print(streams.out, "PLACE\tTYPE\tDEFAULT\tVERSIONS\tVALUES\n");
   for (const KeySection& section : reference.Sections())
     markdown ? WriteMarkdown(section, streams.out) : WriteText(section, streams.out);
   return kDone;
@@ -58,7 +70,7 @@ int KeysCommand(bool markdown, Streams streams) {
 void OfferKeysCommand(CommandOffers& offers) {
   auto markdown = std::make_shared<bool>(false);
   offers
-      .Command("keys", "List all keys with place, type and default",
+      .Command("keys", "List all keys with place, type, default and values",
                [offers, markdown] { return KeysCommand(*markdown, offers.Output()); })
       ->add_flag("--markdown", *markdown, "As a page of the manual");
 }

@@ -60,7 +60,9 @@ void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyRefe
     if (!node->IsKeyword()) continue;
     const std::string value = KvfValuesText(*node);
     const std::string_view standard = reference.DefaultOf(place.path, node->Name());
-    fmt::print(streams.out, "  {} = {}{}\n", node->Name(), value,
+    const std::string_view meaning = reference.MeaningOf(place.path, node->Name(), value);
+    fmt::print(streams.out, "  {} = {}{}{}\n", node->Name(), value,
+               meaning.empty() ? std::string() : fmt::format("  [{}]", meaning),
                standard.empty() || standard == value ? std::string() : fmt::format("  (default {})", standard));
   }
 }

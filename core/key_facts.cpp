@@ -7,6 +7,7 @@
 #include <fmt/format.h>
 
 #include "platform/text.h"
+#include "platform/units.h"
 
 namespace tervane {
 
@@ -21,6 +22,13 @@ std::string KeyFacts::RangeText() const {
   if (!HasGreatest()) return fmt::format("{} or more", ShortestNumber(least));
   if (least == -std::numeric_limits<double>::infinity()) return fmt::format("at most {}", ShortestNumber(greatest));
   return fmt::format("{} to {}", ShortestNumber(least), ShortestNumber(greatest));
+}
+
+std::string_view KeyFacts::UnitText() const {
+  if (unit.starts_with('[') && unit.ends_with(']')) return unit.substr(1, unit.size() - 2);
+  if (!unit.empty()) return unit;
+  const ItemType* const quantity = FindItemType(itemType);
+  return quantity ? BaseUnit(*quantity).abbreviation : std::string_view();
 }
 
 std::string WhyStray(const KeyFacts& facts, double value) {

@@ -34,6 +34,9 @@ struct KeyFacts {
   bool HasGreatest() const { return greatest < std::numeric_limits<double>::infinity(); }
   /// "0 to 1", "0 or more", "at most 1"; empty without a range.
   std::string RangeText() const;
+  /// What is read behind a number: the fixed unit without brackets, or the abbreviation of the quantity's base unit;
+  /// empty for neither.
+  std::string_view UnitText() const;
 };
 
 /// What is wrong with a value by the facts of its key, as a sentence; empty when nothing is. A number that is none is

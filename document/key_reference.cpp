@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "document/key_reference.h"
 
+#include <charconv>
+
 #include "core/list.h"
 #include "core/path.h"
 #include "document/global.h"
@@ -53,13 +55,29 @@ KeyReference::KeyReference() {
   for (std::size_t i = 0; i < sections_.size(); ++i) byPath_.emplace(sections_[i].path, i);
 }
 
-std::string_view KeyReference::DefaultOf(std::string_view sectionPath, std::string_view key) const {
+const KeyInfo* KeyReference::Find(std::string_view sectionPath, std::string_view key) const {
   auto found = byPath_.find(std::string(sectionPath));
   if (found == byPath_.end()) found = byPath_.find(Numbered(sectionPath));
-  if (found == byPath_.end()) return {};
+  if (found == byPath_.end()) return nullptr;
   for (const KeyInfo& info : sections_[found->second].keys)
-    if (Trimmed(info.key) == key) return info.defaultValue;
-  return {};
+    if (Trimmed(info.key) == key) return &info;
+  return nullptr;
+}
+
+std::string_view KeyReference::DefaultOf(std::string_view sectionPath, std::string_view key) const {
+  const KeyInfo* const info = Find(sectionPath, key);
+  return info ? std::string_view(info->defaultValue) : std::string_view();
+}
+
+std::string_view KeyReference::MeaningOf(std::string_view sectionPath, std::string_view key,
+                                         std::string_view value) const {
+  const KeyInfo* const info = Find(sectionPath, key);
+  if (!info) return {};
+  if (info->facts.choices.empty()) return info->facts.UnitText();
+  int number = 0;
+  const auto [end, error] = std::from_chars(value.data(), value.data() + value.size(), number);
+  if (error != std::errc() || end != value.data() + value.size()) return {};
+  return TextOf(info->facts.choices, number - info->inFile);
 }
 
 }  // namespace tervane

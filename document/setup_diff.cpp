@@ -87,6 +87,9 @@ class Comparison {
     const auto isDefault = [&](const NumberedNode& key, const std::string& value) {
       return value == reference_.DefaultOf(path, key.node->Name());
     };
+    const auto meaning = [&](const NumberedNode& key, const std::string& value) {
+      return std::string(reference_.MeaningOf(path, key.node->Name(), value));
+    };
     for (const NumberedNode& key : ChildrenOf(to, true)) {
       if (IsComputed(key.node->Name())) continue;
       const std::string value = KvfValuesText(*key.node);
@@ -94,14 +97,23 @@ class Comparison {
       const std::string oldValue = old ? KvfValuesText(*old) : std::string();
       if (old && oldValue == value) continue;
       result.push_back({old ? SetupDifference::Kind::Changed : SetupDifference::Kind::Added, path, key.Name(), oldValue,
-                        value, old && isDefault(key, oldValue), isDefault(key, value)});
+                        value, old && isDefault(key, oldValue), isDefault(key, value),
+                        old ? meaning(key, oldValue) : std::string(), meaning(key, value)});
     }
     for (const NumberedNode& key : ChildrenOf(from, true)) {
       if (IsComputed(key.node->Name()) ||
           FindKvfNode(to, true, key.node->Name(), static_cast<std::size_t>(key.instance)))
         continue;
       const std::string value = KvfValuesText(*key.node);
-      result.push_back({SetupDifference::Kind::Removed, path, key.Name(), value, {}, isDefault(key, value), false});
+      result.push_back({SetupDifference::Kind::Removed,
+                        path,
+                        key.Name(),
+                        value,
+                        {},
+                        isDefault(key, value),
+                        false,
+                        meaning(key, value),
+                        {}});
     }
   }
 

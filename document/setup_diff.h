@@ -20,6 +20,8 @@ struct SetupDifference {
   std::string to;
   bool fromDefault = false;  ///< The value is the key's default.
   bool toDefault = false;
+  std::string fromMeaning = {};  ///< The text of the choice, or the unit of the number; empty when neither is known.
+  std::string toMeaning = {};
 };
 
 /// The differences between two sections as they are written, in the order of the new one. Items of a list are followed

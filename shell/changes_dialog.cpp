@@ -16,9 +16,10 @@ namespace tervane {
 
 namespace {
 
-QString ValueText(const std::string& value, bool isDefault) {
+QString ValueText(const std::string& value, const std::string& meaning, bool isDefault) {
   if (value.empty()) return isDefault ? ChangesDialog::tr("(default)") : QString("—");
-  return isDefault ? ChangesDialog::tr("%1 (default)").arg(ToQt(value)) : ToQt(value);
+  const QString text = meaning.empty() ? ToQt(value) : QString("%1 [%2]").arg(ToQt(value), ToQt(meaning));
+  return isDefault ? ChangesDialog::tr("%1 (default)").arg(text) : text;
 }
 
 QString KindText(SetupDifference::Kind kind) {
@@ -65,8 +66,8 @@ ChangesDialog::ChangesDialog(const std::vector<SetupDifference>& differences, bo
     QTreeWidgetItem* row = isSection ? section : new QTreeWidgetItem(section, {ToQt(difference.key)});
     row->setText(1, KindText(difference.kind));
     if (isSection && difference.from.empty() && difference.to.empty()) continue;
-    row->setText(2, ValueText(difference.from, difference.fromDefault));
-    row->setText(3, ValueText(difference.to, difference.toDefault));
+    row->setText(2, ValueText(difference.from, difference.fromMeaning, difference.fromDefault));
+    row->setText(3, ValueText(difference.to, difference.toMeaning, difference.toDefault));
     for (const int column : {2, 3}) row->setToolTip(column, row->text(column));
   }
   list->setColumnWidth(0, theme.Scaled(340));

@@ -133,8 +133,8 @@ TEST_F(CommandLine, GetAndShowTellValuesAsTheyWouldBeSaved) {
                                                        {"ExtraParams/ExtraParam_1:Name", "a \"b\""}};
   for (const auto& [path, value] : cases) EXPECT_EQ(Tervane({"get", file, path}).out, value + std::string("\n"));
   const std::string show = Tervane({"show", file, "SimSpec/CompControlParaTimeStep"}).out;
-  EXPECT_THAT(show, HasSubstr("MaxAllowedOLTimeStep = 3f  (default 0.5f)\n"));
-  EXPECT_THAT(show, HasSubstr("InitialTimeStep = 6f\n"));
+  EXPECT_THAT(show, HasSubstr("MaxAllowedOLTimeStep = 3f  [hours]  (default 0.5f)\n"));
+  EXPECT_THAT(show, HasSubstr("InitialTimeStep = 6f  [hours]\n"));
   EXPECT_THAT(show, Not(HasSubstr("SimTitle")));
   EXPECT_THAT(Tervane({"show", file}).out, HasSubstr("SimTitle"));
 }
@@ -167,12 +167,12 @@ TEST_F(CommandLine, SetChangesOneValueAndNothingElse) {
     const char *path, *value, *saved;
   };
   const Case cases[] = {
-      {"SimSpec:ModelType", "3", "0 (default) -> 3"},
+      {"SimSpec:ModelType", "3", "0 [Tervane] (default) -> 3 [MODFLOW 2000]"},
       {"SimSpec/SimTitle:Title", "a \"quoted\" title, with", "\"\" (default) -> \"a \\\"quoted\\\" title, with\""},
       {"SimSpec/SimulationPeriod:SIMEND", "2001-12-31 06:30", "2000, 2, 1, 0, 0 (default) -> 2001, 12, 31, 6, 30"},
       {"SimSpec/SimulationPeriod:SIMEND", "2001,12,31,6,30", "2000, 2, 1, 0, 0 (default) -> 2001, 12, 31, 6, 30"},
       {"SimSpec/CompControlParaOL:RelaxFactor", "0.75", "0.9f (default) -> 0.75f"},
-      {"ModelCompWQ/WQTSC:MaxSimTimeStepSZ", "1e7", "1e9 (default) -> 10000000.0"},
+      {"ModelCompWQ/WQTSC:MaxSimTimeStepSZ", "1e7", "1e9 [hours] (default) -> 10000000.0 [hours]"},
       {"SimSpec/ModelComp:FilenameTvdRes", "run/x.tvdres", "file \"\" (default) -> file \"run/x.tvdres\""}};
   Tervane({"new", before});
   for (const Case& c : cases) {
@@ -260,7 +260,7 @@ TEST_F(CommandLine, DiffComparesBySectionAndKey) {
   EXPECT_EQ(Tervane({"diff", file, file, "--json"}).out, "{\"differences\": []}\n");
   const Outcome outcome = Tervane({"diff", file, other});
   EXPECT_EQ(outcome.status, kFindings);
-  EXPECT_EQ(outcome.out, "SimSpec:ModelType: 1 -> 0 (default)\n");
+  EXPECT_EQ(outcome.out, "SimSpec:ModelType: 1 [MODFLOW Surfact] -> 0 [Tervane] (default)\n");
   const rapidjson::Document json = Json(Tervane({"diff", file, other, "--json"}));
   ASSERT_EQ(json["differences"].Size(), 1u);
   EXPECT_STREQ(json["differences"][0]["from"].GetString(), "1");
@@ -269,11 +269,13 @@ TEST_F(CommandLine, DiffComparesBySectionAndKey) {
 
 TEST_F(CommandLine, KeysListsEveryKeyWithTypeAndDefault) {
   const std::string text = Tervane({"keys"}).out;
-  EXPECT_THAT(text, HasSubstr("\nSimSpec/ModelComp:UZ_ModelType\tint\t2\t\n"));
-  EXPECT_THAT(text, HasSubstr("\nSimSpec/CompControlParaOL:IterStopCriteria\tfloat\t\tup to version 9, read only\n"));
+  EXPECT_THAT(
+      text,
+      HasSubstr("\nSimSpec/ModelComp:UZ_ModelType\tint\t2\t\t0 Richards equation; 1 Gravity Flow; 2 2 Layer UZ\n"));
+  EXPECT_THAT(text, HasSubstr("\nSimSpec/CompControlParaOL:IterStopCriteria\tfloat\t\tup to version 9, read only\t\n"));
   const std::string markdown = Tervane({"keys", "--markdown"}).out;
   EXPECT_THAT(markdown, StartsWith("# Keys of a setup\n"));
-  EXPECT_THAT(markdown, HasSubstr("| `MaxInfiltDepthPerTimeStep ` | float | `10f` | from version 7 |\n"));
+  EXPECT_THAT(markdown, HasSubstr("| `MaxInfiltDepthPerTimeStep ` | float | `10f` | from version 7 | mm |\n"));
 }
 
 TEST_F(CommandLine, WhatIsNoSetupIsRefusedWithoutATrace) {
