@@ -51,6 +51,22 @@ std::string SetupWithItems(int count) {
   return text;
 }
 
+/// As many zones as a river basin has subcatchments in fine grain; the file that they come from is not there.
+std::string SetupWithZones(int count) {
+  CFlowModelDoc setup;
+  auto& zones = *setup.Root().Important(kSubcatchments);
+  zones.DistributionType = CSubcatchmentKvf::kDistributed;
+  for (int code = 1; code <= count; ++code) {
+    const auto zone = zones.CreateStationItem();
+    zone->SetStationId(std::to_string(code));
+    zone->SetStationName(fmt::format("Zone {}", code));
+    zones.AddChild(zone);
+  }
+  std::string text, error;
+  if (!setup.BuildText("/setups", text, error)) fmt::print("not saved: {}\n", error);
+  return text;
+}
+
 // ---- Starts
 
 int ShowBareWindow(int argc, char** argv) {
@@ -188,6 +204,15 @@ void Measure(const QString& self) {
     MeasureChanges(window, "1,000 processed pages", 16);
     MeasureProcessedData(window, 100'000, 5000);
     std::filesystem::remove_all(std::filesystem::path(FromQt(few)).replace_extension() += "_results");
+  }
+  {
+    const QString zones = folder.filePath("zones.tvd");
+    WriteFileAtomically(FromQt(zones), SetupWithZones(10'000));
+    MainWindow window(program);
+    window.resize(1280, 800);
+    window.show();
+    window.OpenDocument(zones);
+    MeasureChanges(window, "10,000 zones", 50);
   }
   MainWindow window(program);
   window.resize(1280, 800);

@@ -21,6 +21,11 @@ class StateBuffer {
   explicit StateBuffer(std::string bytes) : bytes_(std::move(bytes)) {}
 
   const std::string& Bytes() const { return bytes_; }
+  /// Empties the buffer and keeps its memory.
+  void Clear() {
+    bytes_.clear();
+    taken_ = 0;
+  }
 
   template <class Number>
   requires std::is_arithmetic_v<Number>

@@ -17,13 +17,18 @@ void UndoStack::Reset() {
   CaptureAll();
 }
 
-UndoStack::State UndoStack::StateOf(CYbSEKvfBase& node) {
-  StateBuffer values;
-  KeyExchange keys = KeyExchange::Keeping(values);
+bool UndoStack::TakeState(CYbSEKvfBase& node, const State* known, State& state) {
+  values_.Clear();
+  KeyExchange keys = KeyExchange::Keeping(values_);
   node.ExchangeState(keys);
-  const auto* links = dynamic_cast<const LinkHolder*>(&node);
-  return {values.Bytes(), node.title_,         node.abbreviatedTitle_,
-          node.children_, node.plainChildren_, links ? links->Links() : std::vector<void*>()};
+  const auto* holder = dynamic_cast<const LinkHolder*>(&node);
+  std::vector<void*> links = holder ? holder->Links() : std::vector<void*>();
+  if (known && known->values == values_.Bytes() && known->title == node.title_ &&
+      known->abbreviatedTitle == node.abbreviatedTitle_ && known->children == node.children_ &&
+      known->plainChildren == node.plainChildren_ && known->links == links)
+    return false;
+  state = {values_.Bytes(), node.title_, node.abbreviatedTitle_, node.children_, node.plainChildren_, std::move(links)};
+  return true;
 }
 
 void UndoStack::Restore(CYbSEKvfBase& node, const State& state) {
@@ -39,14 +44,12 @@ void UndoStack::Restore(CYbSEKvfBase& node, const State& state) {
 
 void UndoStack::Capture(CYbSEKvfBase& node, const std::shared_ptr<CYbSEKvfBase>& owner, std::vector<Change>& changes) {
   if (!node.HoldsSetup()) return;
-  State state = StateOf(node);
-  const auto [known, isNew] = shadow_.try_emplace(&node);
-  Shadow& shadow = known->second;
+  const auto [place, isNew] = shadow_.try_emplace(&node);
+  Shadow& shadow = place->second;
   shadow.round = round_;
-  if (isNew) {
+  if (State state; TakeState(node, isNew ? nullptr : &shadow.state, state)) {
+    if (!isNew) changes.push_back({&node, owner, std::move(shadow.state), state});
     shadow.state = std::move(state);
-  } else if (!(shadow.state == state)) {
-    changes.push_back({&node, owner, std::exchange(shadow.state, state), state});
   }
   for (const auto& property : node.properties_) Capture(*property, property, changes);
   for (const auto& child : node.children_) Capture(*child, child, changes);
@@ -60,7 +63,7 @@ std::vector<UndoStack::Change> UndoStack::CaptureAll() {
   // the change of its parent keeps it alive, and it holds its values itself.
   for (auto& [node, shadow] : shadow_) {
     if (shadow.round == round_) continue;
-    if (State state = StateOf(*node); !(state == shadow.state))
+    if (State state; TakeState(*node, &shadow.state, state))
       changes.push_back({node, nullptr, std::move(shadow.state), std::move(state)});
   }
   std::erase_if(shadow_, [this](const auto& entry) { return entry.second.round != round_; });

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "core/node.h"
+#include "core/state_buffer.h"
 
 namespace tervane {
 
@@ -54,8 +55,6 @@ class UndoStack {
     Nodes children;
     std::size_t plainChildren = 0;
     std::vector<void*> links;
-
-    bool operator==(const State&) const = default;
   };
   struct Change {
     CYbSEKvfBase* node;
@@ -73,7 +72,9 @@ class UndoStack {
     std::size_t round;  ///< The latest capture that met the node.
   };
 
-  static State StateOf(CYbSEKvfBase& node);
+  /// Takes a node's state where it is not `known`; false otherwise. Most nodes are as they were, so that comparing
+  /// makes no copies.
+  bool TakeState(CYbSEKvfBase& node, const State* known, State& state);
   static void Restore(CYbSEKvfBase& node, const State& state);
   /// Brings the shadow up to date below a node, and collects what differed.
   void Capture(CYbSEKvfBase& node, const std::shared_ptr<CYbSEKvfBase>& owner, std::vector<Change>& changes);
@@ -82,6 +83,7 @@ class UndoStack {
   CYbSEKvfGlobalBase& root_;
   std::unordered_map<CYbSEKvfBase*, Shadow> shadow_;
   std::size_t round_ = 0;
+  StateBuffer values_;  ///< Of the node that is compared; kept for its memory.
   std::deque<Step> steps_;
   std::size_t done_ = 0;  ///< Number of steps that are done; the others can be redone.
   std::size_t saved_ = 0;

@@ -128,12 +128,13 @@ void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& act
     return;
   }
   ++changes_;
-  // What undo does not know of, such as the custom result folder, counts as a change all the same.
-  if (!undo_->Commit(action, source)) document_->SetModified(true);
   if (document_->Root().TakeRevalidateAll())
     document_->Root().Validate();
   else
     node.Validate();
+  // A value that validation mends belongs to the step that made it wrong. What undo does not know of, such as the
+  // custom result folder, counts as a change all the same.
+  if (!undo_->Commit(action, source)) document_->SetModified(true);
   if (listener_) listener_(hint);
 }
 
