@@ -22,6 +22,7 @@ std::string Json(const Explanation& why, const std::string& path) {
   std::vector<std::string> reasons;
   for (const Reason& reason : why.reasons)
     reasons.push_back(JsonObject({{"text", JsonQuoted(reason.text)},
+                                  {"alternative", reason.isAlternative ? "true" : ""},
                                   {"holds", JsonBool(reason.holds)},
                                   {"page", JsonQuoted(reason.page)},
                                   {"path", JsonQuoted(reason.path)},

@@ -101,8 +101,13 @@ void Condition::Collect(const Part& part, const CYbSEKvfBase& asker, bool isNega
     case Kind::And:
     case Kind::Or: {
       const bool needsBoth = (part.kind == Kind::And) == holds;
-      for (const auto& side : {part.a, part.b})
-        if (needsBoth || side->Holds(asker) == holds) Collect(*side, asker, isNegated, facts);
+      const std::size_t before = facts.size();
+      if (needsBoth || part.a->Holds(asker) == holds) Collect(*part.a, asker, isNegated, facts);
+      const std::size_t first = facts.size();
+      if (needsBoth || part.b->Holds(asker) == holds) Collect(*part.b, asker, isNegated, facts);
+      // Both sides say no where one of them would do.
+      const bool isEither = needsBoth && holds == isNegated;
+      if (isEither && before < first && first < facts.size()) facts[first].isAlternative = true;
       break;
     }
     case Kind::Key: {

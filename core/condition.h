@@ -25,7 +25,8 @@ struct ConditionFact {
   std::vector<int> values = {};        ///< The values that fulfil it, or with `isNegated` those that do not.
   bool isFlag = false;                 ///< On or off is asked, not a value.
   bool isNegated = false;
-  std::string sentence = {};  ///< In the place of a key.
+  bool isAlternative = false;  ///< Begins another way to what is missing: this, or what was told before.
+  std::string sentence = {};   ///< In the place of a key.
 };
 
 /// A condition; without anything asked it always holds. Copies share what they ask.

@@ -37,13 +37,14 @@ class Labels {
       // A choice without a label belongs to what stands in front of it in its row.
       const std::string label = !own.empty()     ? std::string(own)
                                 : control.beside ? fmt::format("The method of {}", before_)
-                                                 : "The value of this choice";
+                                                 : std::string();
       labels_.push_back({control.node, control.key, label});
     });
   }
+  /// Empty for a choice that has no label; the key where no control has it.
   std::string Find(const CYbSEKvfBase& node, const std::string& key) const {
     for (const auto& known : labels_)
-      if (known.node == &node && known.key == key && !known.label.empty()) return Replaced(known.label, "\n", " ");
+      if (known.node == &node && known.key == key) return Replaced(known.label, "\n", " ");
     return key;
   }
 
@@ -63,6 +64,14 @@ class Explainer {
 
   /// `keys` know the members of the asking page; null elsewhere.
   Reason InWords(const ConditionFact& fact, const CYbSEKvfBase& asker, BoundKeys* keys = nullptr) {
+    Reason reason = Demanded(fact, asker, keys);
+    reason.isAlternative = fact.isAlternative;
+    if (fact.isAlternative) reason.text.insert(0, "or ");
+    return reason;
+  }
+
+ private:
+  Reason Demanded(const ConditionFact& fact, const CYbSEKvfBase& asker, BoundKeys* keys) {
     Reason reason;
     reason.holds = fact.holds;
     if (!fact.sentence.empty() || !fact.member) {
@@ -83,20 +92,23 @@ class Explainer {
     reason.key = place->key;
     CYbSEKvfBase* shown = PageNodeOf(*place->node, reason);
     const std::string label = shown ? LabelOf(*shown, *place->node, place->key) : place->key;
-    reason.text = fmt::format("{} {}", label, Demand(fact, place->facts));
+    reason.text = Demand(label, fact, place->facts);
     return reason;
   }
 
- private:
-  static std::string Demand(const ConditionFact& fact, const KeyFacts& facts) {
+  static std::string Demand(const std::string& label, const ConditionFact& fact, const KeyFacts& facts) {
     const char* verb = fact.holds ? "is" : "must be";
-    if (fact.isFlag) return fmt::format("{} {}", verb, fact.isNegated ? "off" : "on");
+    if (fact.isFlag) return fmt::format("{} {} {}", label, verb, fact.isNegated ? "off" : "on");
     std::vector<std::string> values;
     for (const int value : fact.values) {
       const std::string_view text = TextOf(facts.choices, value);
       values.push_back(text.empty() ? std::to_string(value) : std::string(text));
     }
-    return fmt::format("{}{} {}", verb, fact.isNegated ? " not" : "", fmt::join(values, " or "));
+    const std::string_view negation = fact.isNegated ? (fact.holds ? " not" : "") : "";
+    const std::string_view refused = fact.isNegated && !fact.holds ? "must not be" : verb;
+    const std::string choice = fmt::format("{}", fmt::join(values, " or "));
+    return label.empty() ? fmt::format("{} {}{} chosen", choice, refused, negation)
+                         : fmt::format("{} {}{} {}", label, refused, negation, choice);
   }
 
   /// The nearest node from here up whose page is shown.

@@ -18,7 +18,7 @@ struct Flags : CTvnKvfBase {
   bool yes = true;
 };
 
-/// "+" in front of what holds; the values that were asked for.
+/// "+" in front of what holds, "or" where another way begins; the values that were asked for.
 std::vector<std::string> Facts(const Condition& condition, const Flags& asker) {
   std::vector<std::string> texts;
   for (const ConditionFact& fact : condition.Why(asker)) {
@@ -27,7 +27,8 @@ std::vector<std::string> Facts(const Condition& condition, const Flags& asker) {
     if (fact.member == &asker.off) asked = "off";
     if (fact.member == &asker.method) asked = fmt::format("method {}", fact.values.front());
     if (fact.member == &asker.yes) asked = "yes";
-    texts.push_back(fmt::format("{}{}{}", fact.holds ? "+" : "-", fact.isNegated ? "not " : "", asked));
+    texts.push_back(fmt::format("{}{}{}{}", fact.isAlternative ? "or " : "", fact.holds ? "+" : "-",
+                                fact.isNegated ? "not " : "", asked));
   }
   return texts;
 }
@@ -50,7 +51,9 @@ TEST(Condition, AnswersAndTellsWhatDecides) {
       {On(n.on) && On(n.off) && never, false, {"-off", "-never"}},
       {On(n.on) && On(n.yes), true, {"+on", "+yes"}},
       {On(n.off) || On(n.on), true, {"+on"}},
-      {On(n.off) || never, false, {"-off", "-never"}},
+      {On(n.off) || never, false, {"-off", "or -never"}},
+      {(On(n.off) && never) || Is(n.method, 3), false, {"-off", "-never", "or -method 3"}},
+      {!(On(n.on) && On(n.yes)), false, {"-not on", "or -not yes"}},
       {!(On(n.on) && On(n.off)), true, {"+not off"}},
       {!(On(n.on) || On(n.off)), false, {"-not on"}},
       {!!On(n.on), true, {"+on"}},

@@ -52,12 +52,12 @@ TEST(Why, ANodeTakesPartIsToldInTheWordsOfThePages) {
       {"section SimSpec {\nsection CompControlParaSZ {\nSolverOption = 1\n}\n}",
        "SimSpec/CompControlParaSZ/CompControlParaSZPCGTrans",
        false,
-       {"The value of this choice must be Preconditioned Conjugate Gradient, Transient"}},
+       {"Preconditioned Conjugate Gradient, Transient must be chosen"}},
       {"",
        "Subcatchments",
        false,
        {"The method of Saturated Flow (SZ) must be Linear Reservoir",
-        "The method of Overland Flow (OL) must be Subcatchment based"}},
+        "or The method of Overland Flow (OL) must be Subcatchment based"}},
   };
   for (const auto& c : cases) {
     SCOPED_TRACE(c.path);
@@ -84,7 +84,7 @@ TEST(Why, AControlIsGreyIsToldWithWhatWouldChangeIt) {
   // Of the page's own values.
   test::PageDriver period(setup.document, "ModelCompWQ/SimulationPeriodWQ");
   EXPECT_EQ(Texts(WhyEnabled(setup.document, period.Page().Form(), period.Find("Cycle End Date:"))),
-            std::vector<std::string>{"The value of this choice must be Recycling on flow results"});
+            std::vector<std::string>{"Recycling on flow results must be chosen"});
 }
 
 TEST(Why, WhatIsMissingTellsEachBranchOnce) {
