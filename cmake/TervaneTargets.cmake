@@ -60,6 +60,19 @@ function(tervane_hot)
   target_compile_options(${name} PRIVATE $<$<AND:$<CONFIG:Release>,$<NOT:$<CXX_COMPILER_ID:MSVC>>>:-O3>)
 endfunction()
 
+# tervane_module(NAME FOR TARGET SOURCES ... LINKS ...): a library in bin/ that a target does not link but loads when it
+# is first needed (platform/program_module.h), since what it links would cost every start some milliseconds.
+function(tervane_module name)
+  cmake_parse_arguments(ARG "" "FOR" "SOURCES;LINKS" ${ARGN})
+  add_library(${name} MODULE ${ARG_SOURCES})
+  target_include_directories(${name} PRIVATE ${PROJECT_SOURCE_DIR})
+  target_link_libraries(${name} PRIVATE ${ARG_LINKS} tervane_warnings)
+  set_target_properties(${name} PROPERTIES PREFIX "" CXX_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON
+    LIBRARY_OUTPUT_DIRECTORY ${CMAKE_RUNTIME_OUTPUT_DIRECTORY})
+  # It must be there when a program runs.
+  add_dependencies(${ARG_FOR} ${name})
+endfunction()
+
 # tervane_program(NAME SOURCES ... [LINKS ...]): a program in bin/.
 function(tervane_program name)
   cmake_parse_arguments(ARG "" "" "SOURCES;LINKS" ${ARGN})

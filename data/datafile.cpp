@@ -170,6 +170,7 @@ struct DataFile::State {
   DataFileHeader header;
 
   ~State() {
+    if (!file.IsOpen()) return;
     const netcdf::Lock lock;
     file = netcdf::Handle();
   }
@@ -297,7 +298,8 @@ class PieceReader {
 
   int GetLocked(const Box& box, std::span<float> values) {
     const netcdf::Lock lock;
-    return nc_get_vara_float(file_, storage_.variable, box.start.data(), box.count.data(), values.data());
+    return netcdf::Library().nc_get_vara_float(file_, storage_.variable, box.start.data(), box.count.data(),
+                                               values.data());
   }
 
   int file_;
@@ -384,7 +386,8 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
     }
     {
       const netcdf::Lock lock;
-      if (const int status = nc_get_vara_double(file.Id(), storage.variable, start.data(), count.data(), box.data()))
+      if (const int status =
+              netcdf::Library().nc_get_vara_double(file.Id(), storage.variable, start.data(), count.data(), box.data()))
         return netcdf::InWords(status);
     }
     BoxWalk walk(count, stride, target);
@@ -436,7 +439,9 @@ std::string DataFile::Open(const std::string& path) {
       // An absolute path, because the library takes others for addresses of the network. A file that is open to others
       // too is read straight into the buffer for conversion, without one more in between, and single numbers alone.
       std::size_t buffer = netcdf::kReadSize;
-      const int status = nc__open(AbsoluteFromHere(path).c_str(), NC_NOWRITE | NC_SHARE, &buffer, &id);
+      if (!netcdf::WhyNoLibrary().empty()) return netcdf::WhyNoLibrary();
+      const int status =
+          netcdf::Library().nc__open(AbsoluteFromHere(path).c_str(), NC_NOWRITE | NC_SHARE, &buffer, &id);
       if (status == NC_NOERR) {
         state->file = netcdf::Handle(id);
         reason = ReadHeader(id, state->header);

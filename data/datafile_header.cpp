@@ -85,18 +85,20 @@ class HeaderReader {
  private:
   std::string ReadInventory() {
     int dimensionCount = 0, variableCount = 0, groupCount = 0;
-    if (const int status = nc_inq(file_, &dimensionCount, &variableCount, nullptr, nullptr)) {
+    if (const int status = netcdf::Library().nc_inq(file_, &dimensionCount, &variableCount, nullptr, nullptr)) {
       return netcdf::InWords(status);
     }
-    if (nc_inq_grps(file_, &groupCount, nullptr) == NC_NOERR && groupCount > 0) {
+    if (netcdf::Library().nc_inq_grps(file_, &groupCount, nullptr) == NC_NOERR && groupCount > 0) {
       notes_.push_back("its groups of variables are not read: only what stands outside groups");
     }
     std::vector<int> ids(static_cast<std::size_t>(dimensionCount));
-    if (const int status = nc_inq_dimids(file_, &dimensionCount, ids.data(), 0)) return netcdf::InWords(status);
+    if (const int status = netcdf::Library().nc_inq_dimids(file_, &dimensionCount, ids.data(), 0))
+      return netcdf::InWords(status);
     char name[NC_MAX_NAME + 1] = {};
     for (const int id : ids) {
       FileDimension dimension;
-      if (const int status = nc_inq_dim(file_, id, name, &dimension.length)) return netcdf::InWords(status);
+      if (const int status = netcdf::Library().nc_inq_dim(file_, id, name, &dimension.length))
+        return netcdf::InWords(status);
       dimension.name = name;
       dimensions_.emplace_back(id, dimension);
     }
@@ -105,10 +107,10 @@ class HeaderReader {
       Variable variable;
       variable.id = id;
       int count = 0;
-      if (const int status = nc_inq_varndims(file_, id, &count)) return netcdf::InWords(status);
+      if (const int status = netcdf::Library().nc_inq_varndims(file_, id, &count)) return netcdf::InWords(status);
       variable.dimensions.resize(static_cast<std::size_t>(count));
-      if (const int status =
-              nc_inq_var(file_, id, name, &variable.type, nullptr, variable.dimensions.data(), nullptr)) {
+      if (const int status = netcdf::Library().nc_inq_var(file_, id, name, &variable.type, nullptr,
+                                                          variable.dimensions.data(), nullptr)) {
         return netcdf::InWords(status);
       }
       variable.name = name;
@@ -212,7 +214,8 @@ class HeaderReader {
     storage.type = variable.type;
     int layout = NC_CONTIGUOUS;
     storage.chunk.resize(variable.dimensions.size());
-    if (nc_inq_var_chunking(file_, variable.id, &layout, storage.chunk.data()) != NC_NOERR || layout != NC_CHUNKED)
+    if (netcdf::Library().nc_inq_var_chunking(file_, variable.id, &layout, storage.chunk.data()) != NC_NOERR ||
+        layout != NC_CHUNKED)
       storage.chunk.clear();
     if (const std::string reason = FindDimensions(variable, storage); !reason.empty()) {
       notes_.push_back(fmt::format("the variable {} is left out: {}", variable.name, reason));
@@ -341,7 +344,7 @@ class HeaderReader {
       return axis;
     }
     std::vector<double> values(dimension.length);
-    if (const int status = nc_get_var_double(file_, coordinates.id, values.data())) {
+    if (const int status = netcdf::Library().nc_get_var_double(file_, coordinates.id, values.data())) {
       axis.error = netcdf::InWords(status);
       return axis;
     }
@@ -369,7 +372,7 @@ class HeaderReader {
     mappingName = mappingName.substr(0, mappingName.find(':'));
     std::optional<GeoTransform> transform;
     int mapping = -1;
-    if (!mappingName.empty() && nc_inq_varid(file_, mappingName.c_str(), &mapping) == NC_NOERR) {
+    if (!mappingName.empty() && netcdf::Library().nc_inq_varid(file_, mappingName.c_str(), &mapping) == NC_NOERR) {
       std::string wkt = TextAttribute(file_, mapping, "crs_wkt");
       if (wkt.empty()) wkt = TextAttribute(file_, mapping, "spatial_ref");
       if (!IsLocalPlane(wkt)) geometry.projection = wkt;
@@ -431,7 +434,7 @@ class HeaderReader {
     const std::string positive = LowerCase(TextAttribute(file_, dimension.coordinates->id, "positive"));
     if (positive != "up" && positive != "down") return;
     std::vector<double> values(dimension.length);
-    if (nc_get_var_double(file_, dimension.coordinates->id, values.data()) != NC_NOERR) return;
+    if (netcdf::Library().nc_get_var_double(file_, dimension.coordinates->id, values.data()) != NC_NOERR) return;
     const bool isAscending = values.back() >= values.front();
     storage.isZTurned = isAscending == (positive == "down");
   }
@@ -474,7 +477,8 @@ class HeaderReader {
     time_.hasDates = true;
     if (time_.steps == 0) return {};
     std::vector<double> values(time_.steps);
-    if (const int status = nc_get_var_double(file_, variable.id, values.data())) return netcdf::InWords(status);
+    if (const int status = netcdf::Library().nc_get_var_double(file_, variable.id, values.data()))
+      return netcdf::InWords(status);
     if (std::string error = ReadBounds(variable, units, values); !error.empty()) return error;
     const std::vector<double> fill = NumbersAttribute(file_, variable.id, "_FillValue");
     time_.stamps.reserve(values.size());
@@ -509,7 +513,8 @@ class HeaderReader {
     if (bounds == variables_.end() || !bounds->IsNumeric() || bounds->dimensions.size() != 2) return {};
     if (bounds->dimensions[0] != *timeDimension_ || DimensionOf(bounds->dimensions[1]).length != 2) return {};
     std::vector<double> pairs(2 * values.size());
-    if (const int status = nc_get_var_double(file_, bounds->id, pairs.data())) return netcdf::InWords(status);
+    if (const int status = netcdf::Library().nc_get_var_double(file_, bounds->id, pairs.data()))
+      return netcdf::InWords(status);
     if (const std::optional<std::int64_t> begin = units.SecondsSinceEpoch(std::min(pairs[0], pairs[1]))) {
       time_.begin = CYbDateTime::FromSecondsSinceEpoch(*begin);
     }

@@ -42,21 +42,22 @@ class Definition {
 
   int Dimension(const char* name, std::size_t length) {
     int id = -1;
-    call_([&] { return nc_def_dim(file_, name, length, &id); });
+    call_([&] { return netcdf::Library().nc_def_dim(file_, name, length, &id); });
     return id;
   }
   int Variable(const std::string& name, nc_type type, const std::vector<int>& dimensions) {
     int id = -1;
     call_([&] {
-      return nc_def_var(file_, name.c_str(), type, static_cast<int>(dimensions.size()), dimensions.data(), &id);
+      return netcdf::Library().nc_def_var(file_, name.c_str(), type, static_cast<int>(dimensions.size()),
+                                          dimensions.data(), &id);
     });
     return id;
   }
   void Text(int variable, const char* name, std::string_view text) {
-    call_([&] { return nc_put_att_text(file_, variable, name, text.size(), text.data()); });
+    call_([&] { return netcdf::Library().nc_put_att_text(file_, variable, name, text.size(), text.data()); });
   }
   void Int(int variable, const char* name, int value) {
-    call_([&] { return nc_put_att_int(file_, variable, name, NC_INT, 1, &value); });
+    call_([&] { return netcdf::Library().nc_put_att_int(file_, variable, name, NC_INT, 1, &value); });
   }
   template <class Function>
   void Call(Function function) {
@@ -174,7 +175,7 @@ int DataFileWriter::State::Define() {
   const bool hasCoordinates = dimensions == 1 || geometry.rotation == 0;
   Definition define(file.Id());
   int old = 0;
-  define.Call([&] { return nc_set_fill(file.Id(), NC_NOFILL, &old); });
+  define.Call([&] { return netcdf::Library().nc_set_fill(file.Id(), NC_NOFILL, &old); });
   define.Text(NC_GLOBAL, "Conventions", "CF-1.8");
 
   std::vector<int> shape;
@@ -247,12 +248,18 @@ int DataFileWriter::State::Define() {
     define.Int(variable, "value_type", static_cast<int>(item.valueType));
     if (content.hasTime) define.Text(variable, "cell_methods", CellMethods(item.valueType));
     if (isGrid) define.Text(variable, "grid_mapping", "crs");
-    define.Call([&] { return nc_put_att_float(file.Id(), variable, "_FillValue", NC_FLOAT, 1, &kDeleteValue); });
+    define.Call([&] {
+      return netcdf::Library().nc_put_att_float(file.Id(), variable, "_FillValue", NC_FLOAT, 1, &kDeleteValue);
+    });
     // Their values come at the end; their place is made here, since making it later would move all data.
     constexpr std::array<float, 2> kNoRange{};
     constexpr double kNoCount = 0;
-    define.Call([&] { return nc_put_att_float(file.Id(), variable, "actual_range", NC_FLOAT, 2, kNoRange.data()); });
-    define.Call([&] { return nc_put_att_double(file.Id(), variable, "value_count", NC_DOUBLE, 1, &kNoCount); });
+    define.Call([&] {
+      return netcdf::Library().nc_put_att_float(file.Id(), variable, "actual_range", NC_FLOAT, 2, kNoRange.data());
+    });
+    define.Call([&] {
+      return netcdf::Library().nc_put_att_double(file.Id(), variable, "value_count", NC_DOUBLE, 1, &kNoCount);
+    });
     if (content.isCompressed) {
       constexpr std::size_t kTile = 1024;
       std::vector<std::size_t> chunk;
@@ -260,17 +267,17 @@ int DataFileWriter::State::Define() {
       if (dimensions > 2) chunk.push_back(1);
       if (isGrid) chunk.push_back(std::min(kTile, static_cast<std::size_t>(geometry.ny)));
       if (dimensions > 0) chunk.push_back(std::min(kTile, static_cast<std::size_t>(geometry.nx)));
-      define.Call([&] { return nc_def_var_chunking(file.Id(), variable, NC_CHUNKED, chunk.data()); });
-      define.Call([&] { return nc_def_var_deflate(file.Id(), variable, 1, 1, 4); });
+      define.Call([&] { return netcdf::Library().nc_def_var_chunking(file.Id(), variable, NC_CHUNKED, chunk.data()); });
+      define.Call([&] { return netcdf::Library().nc_def_var_deflate(file.Id(), variable, 1, 1, 4); });
     }
   }
-  define.Call([&] { return nc_enddef(file.Id()); });
+  define.Call([&] { return netcdf::Library().nc_enddef(file.Id()); });
 
   const auto putCentres = [&](int variable, int count, double first, double distance) {
     if (variable < 0) return;
     std::vector<double> centres(static_cast<std::size_t>(count));
     for (int i = 0; i < count; ++i) centres[static_cast<std::size_t>(i)] = first + distance * i;
-    define.Call([&] { return nc_put_var_double(file.Id(), variable, centres.data()); });
+    define.Call([&] { return netcdf::Library().nc_put_var_double(file.Id(), variable, centres.data()); });
   };
   putCentres(xVariable, geometry.nx, geometry.x0 + geometry.cellSize / 2, geometry.cellSize);
   putCentres(yVariable, geometry.ny, geometry.y0 + geometry.cellSize / 2, geometry.cellSize);
@@ -313,7 +320,8 @@ std::string DataFileWriter::State::PutRows(int variable, std::size_t layer, std:
       count[y] = std::min(atOnce, ny - row);
     }
     const netcdf::Lock lock;
-    const int status = nc_put_vara_float(file.Id(), variable, start.data(), count.data(), values.data() + row * nx);
+    const int status =
+        netcdf::Library().nc_put_vara_float(file.Id(), variable, start.data(), count.data(), values.data() + row * nx);
     if (status != NC_NOERR) return netcdf::InWords(status);
   }
   return {};
@@ -385,12 +393,13 @@ std::string DataFileWriter::Create(const std::string& path, const NewDataFile& c
   if (FileResult begun = state->replacement.Begin(path); !begun.Ok()) return begun.error;
   {
     const netcdf::Lock lock;
+    if (!netcdf::WhyNoLibrary().empty()) return netcdf::WhyNoLibrary();
     int id = -1;
     // The library's own buffer is a few kB, and it seeks, reads and writes for each of them.
     std::size_t buffer = netcdf::kBufferSize;
     const int format = content.isCompressed ? NC_NETCDF4 : NC_64BIT_OFFSET;
-    int status =
-        nc__create(AbsoluteFromHere(state->replacement.TemporaryPath()).c_str(), NC_CLOBBER | format, 0, &buffer, &id);
+    int status = netcdf::Library().nc__create(AbsoluteFromHere(state->replacement.TemporaryPath()).c_str(),
+                                              NC_CLOBBER | format, 0, &buffer, &id);
     if (status == NC_NOERR) {
       state->file = netcdf::Handle(id);
       status = state->Define();
@@ -419,12 +428,14 @@ std::string DataFileWriter::AddStep(const CYbDateTime& stamp) {
   Calls call;
   const netcdf::Lock lock;
   const int file = state.file.Id();
-  call([&] { return nc_put_var1_double(file, state.time, &step, &seconds); });
+  call([&] { return netcdf::Library().nc_put_var1_double(file, state.time, &step, &seconds); });
   if (state.bounds >= 0) {
     const auto putBounds = [&](std::size_t at, double begin, double end) {
       const std::array<std::size_t, 2> start{at, 0}, count{1, 2};
       const std::array<double, 2> pair{begin, end};
-      call([&] { return nc_put_vara_double(file, state.bounds, start.data(), count.data(), pair.data()); });
+      call([&] {
+        return netcdf::Library().nc_put_vara_double(file, state.bounds, start.data(), count.data(), pair.data());
+      });
     };
     if (step == 0) {
       const bool hasBegin = state.content.begin && *state.content.begin < stamp;
@@ -471,8 +482,12 @@ FileResult DataFileWriter::Finish(ProgressPart progress) {
       const auto count = static_cast<double>(summary.count);
       std::array<float, 2> range{summary.smallest, summary.largest};
       if (summary.count == 0) range.fill(std::numeric_limits<float>::quiet_NaN());
-      call([&] { return nc_put_att_float(file, state->variables[i], "actual_range", NC_FLOAT, 2, range.data()); });
-      call([&] { return nc_put_att_double(file, state->variables[i], "value_count", NC_DOUBLE, 1, &count); });
+      call([&] {
+        return netcdf::Library().nc_put_att_float(file, state->variables[i], "actual_range", NC_FLOAT, 2, range.data());
+      });
+      call([&] {
+        return netcdf::Library().nc_put_att_double(file, state->variables[i], "value_count", NC_DOUBLE, 1, &count);
+      });
     }
     const int closed = state->file.Close();
     call([&] { return closed; });

@@ -10,9 +10,9 @@
 #include <system_error>
 
 #include <fmt/format.h>
-#include <hdf5.h>
 
 #include "platform/os.h"
+#include "platform/program_module.h"
 
 namespace tervane::netcdf {
 
@@ -23,11 +23,20 @@ std::mutex& Mutex() {
   return mutex;
 }
 
+const LateCalls<Calls>& Loaded() {
+  static const LateCalls<Calls> loaded = LoadCalls<Calls>(kModuleName, kEntryName, "reads data files");
+  return loaded;
+}
+
 }  // namespace
 
+const Calls& Library() { return *Loaded().calls; }
+const std::string& WhyNoLibrary() { return Loaded().problem; }
+
 Lock::Lock() : guard_(Mutex()) {
+  if (!Loaded().calls) return;
   // The setting is one of each thread.
-  thread_local const herr_t silenced = H5Eset_auto2(H5E_DEFAULT, nullptr, nullptr);
+  thread_local const herr_t silenced = Library().H5Eset_auto2(H5E_DEFAULT, nullptr, nullptr);
   static_cast<void>(silenced);
 }
 
@@ -50,7 +59,7 @@ std::string InWords(int status) {
     case NC_ENOFILTER:
       return "it is compressed by a method that is not installed here";
     default:
-      return nc_strerror(status);
+      return Library().nc_strerror(status);
   }
 }
 
@@ -58,17 +67,17 @@ std::string TextAttribute(int file, int variable, const char* name) {
   constexpr std::size_t kLongest = 1u << 20;
   nc_type type = NC_NAT;
   std::size_t length = 0;
-  if (nc_inq_att(file, variable, name, &type, &length) != NC_NOERR) return {};
+  if (Library().nc_inq_att(file, variable, name, &type, &length) != NC_NOERR) return {};
   if (type == NC_STRING && length == 1) {
     char* text = nullptr;
-    if (nc_get_att_string(file, variable, name, &text) != NC_NOERR || text == nullptr) return {};
+    if (Library().nc_get_att_string(file, variable, name, &text) != NC_NOERR || text == nullptr) return {};
     std::string result = text;
-    nc_free_string(1, &text);
+    Library().nc_free_string(1, &text);
     return result;
   }
   if (type != NC_CHAR || length > kLongest) return {};
   std::string text(length, '\0');
-  if (nc_get_att_text(file, variable, name, text.data()) != NC_NOERR) return {};
+  if (Library().nc_get_att_text(file, variable, name, text.data()) != NC_NOERR) return {};
   // Some programs write the zero that ends a text in C.
   text.resize(std::min(text.find('\0'), text.size()));
   return text;
@@ -78,10 +87,10 @@ std::vector<double> NumbersAttribute(int file, int variable, const char* name) {
   constexpr std::size_t kMost = 1000;
   nc_type type = NC_NAT;
   std::size_t length = 0;
-  if (nc_inq_att(file, variable, name, &type, &length) != NC_NOERR) return {};
+  if (Library().nc_inq_att(file, variable, name, &type, &length) != NC_NOERR) return {};
   if (type == NC_CHAR || type > NC_UINT64 || length > kMost) return {};
   std::vector<double> numbers(length);
-  if (nc_get_att_double(file, variable, name, numbers.data()) != NC_NOERR) return {};
+  if (Library().nc_get_att_double(file, variable, name, numbers.data()) != NC_NOERR) return {};
   return numbers;
 }
 

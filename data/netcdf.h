@@ -13,7 +13,7 @@
 #include <utility>
 #include <vector>
 
-#include <netcdf.h>
+#include "data/netcdf_calls.h"
 
 namespace tervane::netcdf {
 
@@ -46,13 +46,13 @@ class Handle {
     return *this;
   }
   ~Handle() {
-    if (id_ >= 0) nc_close(id_);
+    if (id_ >= 0) Library().nc_close(id_);
   }
 
   int Id() const { return id_; }
   bool IsOpen() const { return id_ >= 0; }
   /// The library's status.
-  int Close() { return nc_close(std::exchange(id_, -1)); }
+  int Close() { return Library().nc_close(std::exchange(id_, -1)); }
 
  private:
   int id_ = -1;

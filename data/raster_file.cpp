@@ -16,6 +16,7 @@
 #include "platform/item_types.h"
 #include "platform/os.h"
 #include "platform/paths.h"
+#include "platform/program_module.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -27,25 +28,11 @@ struct LoadedModule {
   std::string problem;
 };
 
-/// Loads the module from the program's folder; for an engine from the one above it, where the programs are, and for a
-/// test of the build from theirs.
 LoadedModule LoadRasterModule() {
-  const std::string name = os::SharedLibraryName(raster::kModuleName);
-  const std::string folder(FolderOf(os::ProgramPath()));
-  for (const char* place : {"/", "/../", "/../bin/"}) {
-    const std::string path = folder + place + name;
-    if (!FileExists(path)) continue;
-    std::string reason;
-    void* const library = os::LoadSharedLibrary(path, reason);
-    const auto entry =
-        library != nullptr ? reinterpret_cast<raster::Entry>(os::FunctionOf(library, raster::kEntryName)) : nullptr;
-    raster::Module* const module = entry != nullptr ? entry(raster::kInterface) : nullptr;
-    if (module != nullptr) return {module, {}};
-    if (reason.empty()) reason = "it belongs to another version of the program";
-    return {nullptr, fmt::format("{} cannot be loaded: {}; install the program anew", path, reason)};
-  }
-  return {nullptr, fmt::format("{}, which reads rasters, is missing beside the program in {}; install the program anew",
-                               name, folder)};
+  ProgramModule loaded = LoadProgramModule(raster::kModuleName, raster::kEntryName, "reads rasters");
+  if (!loaded.entry) return {nullptr, std::move(loaded.problem)};
+  raster::Module* const module = reinterpret_cast<raster::Entry>(loaded.entry)(raster::kInterface);
+  return {module, module ? std::string() : OtherVersionOf(raster::kModuleName)};
 }
 
 /// The lock of netCDF must be held, here and wherever the module is called: GDAL's driver for netCDF shares the

@@ -7,28 +7,50 @@
 #include <utility>
 
 #include <fmt/format.h>
-#include <proj.h>
 
+#include "geometry/proj_calls.h"
+#include "platform/program_module.h"
 #include "platform/text.h"
 #include "platform/text_fields.h"
 
 namespace tervane {
+
+namespace projections {
+
 namespace {
 
+const LateCalls<Calls>& Loaded() {
+  static const LateCalls<Calls> loaded = LoadCalls<Calls>(kModuleName, kEntryName, "knows projections");
+  return loaded;
+}
+
+}  // namespace
+
+const Calls& Library() { return *Loaded().calls; }
+const std::string& WhyNoLibrary() { return Loaded().problem; }
+
+}  // namespace projections
+
+namespace {
+
+using projections::Library;
+
 struct ContextCloser {
-  void operator()(PJ_CONTEXT* context) const { proj_context_destroy(context); }
+  void operator()(PJ_CONTEXT* context) const { Library().proj_context_destroy(context); }
 };
 struct ObjectCloser {
-  void operator()(PJ* object) const { proj_destroy(object); }
+  void operator()(PJ* object) const { Library().proj_destroy(object); }
 };
 using Context = std::unique_ptr<PJ_CONTEXT, ContextCloser>;
 using Object = std::unique_ptr<PJ, ObjectCloser>;
 
+/// Null without the library.
 Context MakeContext() {
-  Context context(proj_context_create());
-  proj_log_level(context.get(), PJ_LOG_NONE);
+  if (!projections::WhyNoLibrary().empty()) return nullptr;
+  Context context(Library().proj_context_create());
+  Library().proj_log_level(context.get(), PJ_LOG_NONE);
   // No text that somebody typed should make the program ask the network.
-  proj_context_set_enable_network(context.get(), 0);
+  Library().proj_context_set_enable_network(context.get(), 0);
   return context;
 }
 
@@ -39,31 +61,32 @@ PJ_CONTEXT* ThreadContext() {
 }
 
 Object FindByName(const std::string& name) {
-  PJ_OBJ_LIST* const list = proj_create_from_name(ThreadContext(), nullptr, name.c_str(), nullptr, 0, 0, 1, nullptr);
+  PJ_OBJ_LIST* const list =
+      Library().proj_create_from_name(ThreadContext(), nullptr, name.c_str(), nullptr, 0, 0, 1, nullptr);
   Object found;
-  if (list && proj_list_get_count(list) > 0) found.reset(proj_list_get(ThreadContext(), list, 0));
-  proj_list_destroy(list);
+  if (list && Library().proj_list_get_count(list) > 0) found.reset(Library().proj_list_get(ThreadContext(), list, 0));
+  Library().proj_list_destroy(list);
   return found;
 }
 
 /// The coordinate system of a text, without what is bound to it; null when it is none.
 Object MakeSystem(const std::string& text) {
   std::string asked(Trimmed(text));
-  if (asked.empty() || asked.find('\0') != std::string::npos) return nullptr;
+  if (asked.empty() || asked.find('\0') != std::string::npos || !ThreadContext()) return nullptr;
   // A PROJ string is an operation unless it says otherwise.
   const bool isProjText = asked.starts_with('+') || asked.starts_with("proj=");
   if (isProjText && asked.find("type=crs") == std::string::npos) asked += " +type=crs";
   // PROJ takes a bare word for a name and guesses, long and wrongly: only a name that is written out is one here.
   const bool isName = !isProjText && asked.find_first_of("[{:") == std::string::npos;
-  Object object(isName ? FindByName(asked).release() : proj_create(ThreadContext(), asked.c_str()));
-  if (!object || !proj_is_crs(object.get())) return nullptr;
+  Object object(isName ? FindByName(asked).release() : Library().proj_create(ThreadContext(), asked.c_str()));
+  if (!object || !Library().proj_is_crs(object.get())) return nullptr;
   // A system with heights has its plane as its first part, one that is bound to another stands inside.
   for (int depth = 0; depth < 8; ++depth) {
-    const PJ_TYPE type = proj_get_type(object.get());
+    const PJ_TYPE type = Library().proj_get_type(object.get());
     if (type == PJ_TYPE_BOUND_CRS)
-      object.reset(proj_get_source_crs(ThreadContext(), object.get()));
+      object.reset(Library().proj_get_source_crs(ThreadContext(), object.get()));
     else if (type == PJ_TYPE_COMPOUND_CRS)
-      object.reset(proj_crs_get_sub_crs(ThreadContext(), object.get(), 0));
+      object.reset(Library().proj_crs_get_sub_crs(ThreadContext(), object.get(), 0));
     else
       break;
     if (!object) return nullptr;
@@ -87,8 +110,8 @@ const Facts& FactsOf(const std::string& text) {
   if (known.size() >= kMostTexts) known.clear();
   Facts& facts = known[text];
   if (const Object system = MakeSystem(text)) {
-    const char* const name = proj_get_name(system.get());
-    facts = {true, proj_get_type(system.get()), name ? name : ""};
+    const char* const name = Library().proj_get_name(system.get());
+    facts = {true, Library().proj_get_type(system.get()), name ? name : ""};
   }
   return facts;
 }
@@ -96,20 +119,21 @@ const Facts& FactsOf(const std::string& text) {
 bool IsAngles(PJ_TYPE type) { return type == PJ_TYPE_GEOGRAPHIC_2D_CRS || type == PJ_TYPE_GEOGRAPHIC_3D_CRS; }
 
 bool IsEquivalent(const PJ* a, const PJ* b) {
-  return proj_is_equivalent_to_with_ctx(ThreadContext(), a, b, PJ_COMP_EQUIVALENT_EXCEPT_AXIS_ORDER_GEOGCRS) != 0;
+  return Library().proj_is_equivalent_to_with_ctx(ThreadContext(), a, b,
+                                                  PJ_COMP_EQUIVALENT_EXCEPT_AXIS_ORDER_GEOGCRS) != 0;
 }
 
 /// The system of the EPSG register that the object certainly means, if any.
 Object Registered(const PJ* object) {
   int* confidences = nullptr;
-  PJ_OBJ_LIST* const list = proj_identify(ThreadContext(), object, "EPSG", nullptr, &confidences);
+  PJ_OBJ_LIST* const list = Library().proj_identify(ThreadContext(), object, "EPSG", nullptr, &confidences);
   Object found;
   // Above this PROJ has found the same definition, perhaps under another name.
   constexpr int kSame = 90;
-  if (list && proj_list_get_count(list) > 0 && confidences[0] >= kSame)
-    found.reset(proj_list_get(ThreadContext(), list, 0));
-  proj_list_destroy(list);
-  proj_int_list_destroy(confidences);
+  if (list && Library().proj_list_get_count(list) > 0 && confidences[0] >= kSame)
+    found.reset(Library().proj_list_get(ThreadContext(), list, 0));
+  Library().proj_list_destroy(list);
+  Library().proj_int_list_destroy(confidences);
   return found;
 }
 
@@ -123,6 +147,7 @@ std::string CYbMapProjection::IDtoProjectionString(int id) {
 
 std::string CYbMapProjection::Problem() const {
   if (IsEmpty(text_) || FactsOf(text_).isKnown) return {};
+  if (!projections::WhyNoLibrary().empty()) return projections::WhyNoLibrary();
   return fmt::format("\"{}\" is no coordinate system that is known: WKT, EPSG:CODE or +proj=... is expected",
                      Shown(text_));
 }
@@ -157,17 +182,19 @@ struct Operation {
 
   /// No operation when no way is known from one system to the other; both are of this thread.
   Operation(const PJ* from, const PJ* to) : context(MakeContext()) {
-    const Object ownFrom(proj_clone(context.get(), from)), ownTo(proj_clone(context.get(), to));
-    const Object made(proj_create_crs_to_crs_from_pj(context.get(), ownFrom.get(), ownTo.get(), nullptr, nullptr));
+    const Object ownFrom(Library().proj_clone(context.get(), from)), ownTo(Library().proj_clone(context.get(), to));
+    const Object made(
+        Library().proj_create_crs_to_crs_from_pj(context.get(), ownFrom.get(), ownTo.get(), nullptr, nullptr));
     // Longitude first, whatever order the register has.
-    if (made) operation.reset(proj_normalize_for_visualization(context.get(), made.get()));
+    if (made) operation.reset(Library().proj_normalize_for_visualization(context.get(), made.get()));
   }
 
   bool Convert(PJ_DIRECTION direction, double& x, double& y) const {
     if (!std::isfinite(x) || !std::isfinite(y)) return false;
-    proj_errno_reset(operation.get());
-    const PJ_COORD result = proj_trans(operation.get(), direction, proj_coord(x, y, 0, HUGE_VAL));
-    if (proj_errno(operation.get()) != 0 || !std::isfinite(result.xy.x) || !std::isfinite(result.xy.y)) return false;
+    Library().proj_errno_reset(operation.get());
+    const PJ_COORD result = Library().proj_trans(operation.get(), direction, Library().proj_coord(x, y, 0, HUGE_VAL));
+    if (Library().proj_errno(operation.get()) != 0 || !std::isfinite(result.xy.x) || !std::isfinite(result.xy.y))
+      return false;
     x = result.xy.x;
     y = result.xy.y;
     return true;
@@ -192,7 +219,7 @@ CYbCartography::CYbCartography(const std::string& projection, double longitude, 
     problem_ = "a place and a rotation beside the projection are not supported";
   }
   if (!problem_.empty()) return;
-  const Object system = MakeSystem(projection), target(proj_create(ThreadContext(), "EPSG:4326"));
+  const Object system = MakeSystem(projection), target(Library().proj_create(ThreadContext(), "EPSG:4326"));
   if (system && target)
     transformation_ = std::make_unique<Transformation>(Transformation{{system.get(), target.get()}});
   if (!transformation_ || !transformation_->operation.operation)

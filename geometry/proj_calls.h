@@ -1,0 +1,56 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The functions of PROJ that we call. A module has them, which is loaded when a projection is first asked for.
+#pragma once
+
+#include <cstddef>
+#include <string>
+
+#include <proj.h>
+
+namespace tervane::projections {
+
+#define TERVANE_PROJ_CALLS(CALL)         \
+  CALL(proj_clone)                       \
+  CALL(proj_context_create)              \
+  CALL(proj_context_destroy)             \
+  CALL(proj_context_set_enable_network)  \
+  CALL(proj_coord)                       \
+  CALL(proj_create)                      \
+  CALL(proj_create_crs_to_crs_from_pj)   \
+  CALL(proj_create_from_name)            \
+  CALL(proj_crs_get_sub_crs)             \
+  CALL(proj_destroy)                     \
+  CALL(proj_errno)                       \
+  CALL(proj_errno_reset)                 \
+  CALL(proj_get_name)                    \
+  CALL(proj_get_source_crs)              \
+  CALL(proj_get_type)                    \
+  CALL(proj_identify)                    \
+  CALL(proj_int_list_destroy)            \
+  CALL(proj_is_crs)                      \
+  CALL(proj_is_equivalent_to_with_ctx)   \
+  CALL(proj_list_destroy)                \
+  CALL(proj_list_get)                    \
+  CALL(proj_list_get_count)              \
+  CALL(proj_log_level)                   \
+  CALL(proj_normalize_for_visualization) \
+  CALL(proj_trans)
+
+/// A pointer for each function, under the function's name.
+struct Calls {
+#define TERVANE_POINTER(name) decltype(&::name) name;
+  TERVANE_PROJ_CALLS(TERVANE_POINTER)
+#undef TERVANE_POINTER
+};
+
+inline constexpr const char* kModuleName = "tervane_proj";
+inline constexpr const char* kEntryName = "TervaneProjCalls";
+
+/// The functions; loads the module. Without it nothing may be called.
+const Calls& Library();
+/// Why there is no library; empty when it is there. To be asked before the first call of a file or text.
+const std::string& WhyNoLibrary();
+
+}  // namespace tervane::projections
