@@ -48,6 +48,12 @@ void CheckRows(const LibraryKind& kind, const LibraryEntry& entry, std::size_t p
 
 }  // namespace
 
+bool LibraryRow::operator==(const LibraryRow& other) const {
+  const auto isSame = [](double a, double b) { return a == b || (std::isnan(a) && std::isnan(b)); };
+  return std::ranges::equal(values, other.values, isSame) && more == other.more && context == other.context &&
+         line == other.line;
+}
+
 void LibraryEntry::DeleteRow(std::size_t row) {
   const std::string kept = std::move(rows[row].context.others);
   rows.erase(rows.begin() + static_cast<std::ptrdiff_t>(row));

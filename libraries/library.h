@@ -43,7 +43,8 @@ struct LibraryRow {
   LibraryContext context = {};
   int line = 0;  ///< Where it was read; 0 for a new one.
 
-  bool operator==(const LibraryRow&) const = default;
+  /// Missing numbers are equal.
+  bool operator==(const LibraryRow& other) const;
 };
 
 /// What should have been a text or row of an entry; it is kept as it stands.

@@ -15,6 +15,8 @@ constexpr const LibraryKind* kKinds[] = {&kVegetationLibrary};
 
 }  // namespace
 
+std::span<const LibraryKind* const> LibraryKinds() { return kKinds; }
+
 const LibraryKind* LibraryKindOf(std::string_view path) {
   const std::size_t dot = path.find_last_of("./\\");
   if (dot == std::string_view::npos || path[dot] != '.') return nullptr;
