@@ -45,6 +45,7 @@ class LibraryEditor {
   void Add();
   void Duplicate();
   void Delete();
+  bool HasFindings() const { return !findings_.empty(); }
   bool HasFindings(std::size_t entry) const;
 
   /// The page of the current entry. `changed` is called after every change, `soon` asks to show the page anew.

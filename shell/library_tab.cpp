@@ -5,9 +5,11 @@
 #include <QFileInfo>
 #include <QHBoxLayout>
 #include <QListWidget>
+#include <QPixmap>
 #include <QShortcut>
 #include <QSignalBlocker>
 #include <QSplitter>
+#include <QTimer>
 #include <QToolButton>
 #include <QVBoxLayout>
 
@@ -101,9 +103,10 @@ void LibraryTab::BuildPage() {
   const auto sync = [this] { QTimer::singleShot(0, this, &LibraryTab::Sync); };
   page_ = new PageView(editor_.MakePage(
                            host_, [this] { Sync(); }, sync),
-                       ToQt(Path()));
+                       Name());
   pagePlace_->layout()->addWidget(page_);
   const Theme& theme = Theme::Get();
+  list_->setIconSize(QSize(theme.Scaled(14), theme.Scaled(14)));
   add_->setIcon(theme.Icon("insert"));
   copy_->setIcon(theme.Icon("new"));
   delete_->setIcon(theme.Icon("delete"));
@@ -116,12 +119,19 @@ void LibraryTab::Sync() {
     // Rows stay where they are, so that the list does not jump.
     while (list_->count() > static_cast<int>(library.entries.size())) delete list_->takeItem(list_->count() - 1);
     while (list_->count() < static_cast<int>(library.entries.size())) list_->addItem(QString());
+    // Beside marked entries the names of the others stand in line with theirs.
+    QIcon noIcon;
+    if (editor_.HasFindings()) {
+      QPixmap empty(list_->iconSize());
+      empty.fill(Qt::transparent);
+      noIcon = QIcon(empty);
+    }
     for (int row = 0; row < list_->count(); ++row) {
       const auto place = static_cast<std::size_t>(row);
       QListWidgetItem* item = list_->item(row);
       const QString name = ToQt(library.entries[place].Name());
       item->setText(name.isEmpty() ? tr("(no name)") : name);
-      item->setIcon(editor_.HasFindings(place) ? Theme::Get().Icon("error") : QIcon());
+      item->setIcon(editor_.HasFindings(place) ? Theme::Get().Icon("error") : noIcon);
     }
     list_->setCurrentRow(library.entries.empty() ? -1 : static_cast<int>(editor_.Current()));
   }
@@ -156,10 +166,13 @@ void LibraryTab::Redo() {
 
 bool LibraryTab::Save(const std::string& path) {
   Commit();
+  const bool isRenamed = path != Path();
   const FileResult result = editor_.Save(path);
   if (!result.Ok()) host_.Tell(result.error, Host::Icon::Error);
   if (!result.note.empty()) host_.Tell(result.note, Host::Icon::Information);
-  if (result.Ok()) Redraw();
+  // The page bears the file's name.
+  if (result.Ok() && isRenamed) BuildPage();
+  Sync();
   return result.Ok();
 }
 
