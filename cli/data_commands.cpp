@@ -8,11 +8,13 @@
 #include <fmt/ostream.h>
 
 #include "cli/json.h"
+#include "cli/library_info.h"
 #include "cli/offers.h"
 #include "data/datafile.h"
 #include "data/datafile_request.h"
 #include "geometry/shapes.h"
 #include "geometry/xyz_text.h"
+#include "libraries/library_kinds.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 
@@ -219,6 +221,7 @@ bool HasExtension(const std::string& path, std::initializer_list<std::string_vie
 }
 
 int DataInfoCommand(const std::string& path, bool json, Streams streams) {
+  if (const LibraryKind* kind = LibraryKindOf(path)) return TellLibrary(*kind, path, json, streams);
   if (HasExtension(path, {".shp"})) return TellShapes(path, json, streams);
   if (HasExtension(path, {".txt", ".xyz"})) return TellPoints(path, json, streams);
   DataFile file;
@@ -267,7 +270,8 @@ void OfferDataCommands(CommandOffers& offers) {
     bool json = false;
   };
   auto options = std::make_shared<Options>();
-  CLI::App* data = offers.Family("data", "Look into data files (.nds0 to .nds3, netCDF) and rasters (GeoTIFF, ...)");
+  CLI::App* data = offers.Family(
+      "data", "Look into data files (.nds0 to .nds3, netCDF), rasters (GeoTIFF, ...) and libraries (.etv)");
   CLI::App* info = offers.Command(
       "info", "Tell items, times and place",
       [offers, options] { return DataInfoCommand(options->file, options->json, offers.Output()); }, data);

@@ -14,6 +14,8 @@
 
 namespace tervane {
 
+struct LibraryKind;
+
 class Host {
  public:
   virtual ~Host() = default;
@@ -50,6 +52,20 @@ class Host {
   /// The chosen row, or nothing when the user gave up or no row may be chosen.
   virtual std::optional<int> AskItem(const ItemQuestion& question) = 0;
 
+  /// What is chosen among the libraries of a kind: a file, and one of its entries by its name.
+  struct LibraryQuestion {
+    const LibraryKind& kind;
+    std::string file;  ///< What is chosen at first; both may be empty.
+    std::string entry;
+  };
+  struct LibraryChoice {
+    std::string file, entry;
+
+    bool operator==(const LibraryChoice&) const = default;
+  };
+  /// A library that is there with an entry of it, or nothing when the user gave up.
+  virtual std::optional<LibraryChoice> SelectLibraryEntry(const LibraryQuestion& question) = 0;
+
   virtual void OpenBrowser(const std::string& address) = 0;
 
   /// Does what the user has asked for and waits for. A desktop shows meanwhile how far it is, in a window in which it
@@ -69,6 +85,7 @@ class NobodyToAsk : public Host {
   std::optional<std::string> AskFileToOpen(const FileQuestion& /*question*/) override { return std::nullopt; }
   std::optional<std::string> AskFileToSave(const FileQuestion& /*question*/) override { return std::nullopt; }
   std::optional<int> AskItem(const ItemQuestion& /*question*/) override { return std::nullopt; }
+  std::optional<LibraryChoice> SelectLibraryEntry(const LibraryQuestion& /*question*/) override { return std::nullopt; }
   void OpenBrowser(const std::string& /*address*/) override {}
   std::string Setting(const std::string& /*name*/) const override { return {}; }
   void SetSetting(const std::string& /*name*/, const std::string& /*value*/) override {}

@@ -122,7 +122,7 @@ int main(int argc, char** argv) {
   os::PrepareProcess();
   CLI::App commandLine{"The setup editor of the integrated catchment model Tervane.", "quarzel"};
   Typed typed;
-  commandLine.add_option("FILE", typed.files, "Setups (.tvd) and data files to open");
+  commandLine.add_option("FILE", typed.files, "Setups (.tvd), libraries (.etv) and data files to open");
   commandLine.add_option("--page", typed.page, "The node to show, as Climate/PrecipitationRate");
   commandLine.add_option("--zoom", typed.zoom, "The size of everything, 1.5 for half as large again")
       ->check(CLI::Range(0.5, 3.0));

@@ -24,6 +24,7 @@
 #include "execution/execute_flags.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
+#include "shell/library_tab.h"
 #include "shell/main_window.h"
 #include "shell/page/table_view.h"
 #include "shell/program.h"
@@ -49,6 +50,14 @@ CViewSettingsKvf& ViewSettingsOf(const DocumentFrame& frame) {
 template <class Node>
 void GoToImportant(DocumentFrame& frame, ImportantName<Node> name) {
   if (const Node* node = frame.Session().Document().Root().Important(name)) frame.GoTo(node->Serial());
+}
+
+std::pair<QString, QString> TitleAndPath(const QWidget* tab) {
+  if (const auto* frame = qobject_cast<const DocumentFrame*>(tab))
+    return {frame->Title(), ToQt(frame->Session().Path())};
+  if (const auto* library = qobject_cast<const LibraryTab*>(tab)) return {library->Title(), ToQt(library->Path())};
+  if (const auto* viewer = qobject_cast<const DataViewer*>(tab)) return {viewer->Title(), ToQt(viewer->Path())};
+  return {};
 }
 
 bool HasWaterQuality(const DocumentFrame& frame) {
@@ -79,6 +88,23 @@ MainWindow::Command& MainWindow::AddForDocument(QMenu* menu, const QString& text
   return command;
 }
 
+MainWindow::Command& MainWindow::AddForEditor(QMenu* menu, const QString& text, const char* icon,
+                                              const QKeySequence& keys, std::function<void(DocumentFrame&)> ofDocument,
+                                              std::function<void(LibraryTab&)> ofLibrary) {
+  Command& command =
+      Add(menu, text, icon, keys, [this, ofDocument = std::move(ofDocument), ofLibrary = std::move(ofLibrary)] {
+        if (DocumentFrame* frame = Frame()) {
+          frame->Commit();
+          ofDocument(*frame);
+        } else if (LibraryTab* library = ShownLibrary()) {
+          library->Commit();
+          ofLibrary(*library);
+        }
+      });
+  command.enabled = [this] { return Frame() || ShownLibrary(); };
+  return command;
+}
+
 void MainWindow::BuildMenus() {
   standardBar_ = addToolBar(tr("Standard"));
   standardBar_->setObjectName("Standard");
@@ -93,10 +119,12 @@ void MainWindow::BuildMenus() {
   recentMenu_ = file->addMenu(tr("Open &Recent"));
   connect(recentMenu_, &QMenu::aboutToShow, this, &MainWindow::FillRecentMenu);
   file->addSeparator();
-  Command& save =
-      AddForDocument(file, tr("&Save"), "save", QKeySequence::Save, [this](DocumentFrame&) { SaveDocument(); });
-  AddForDocument(file, tr("Save &As…"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_S),
-                 [this](DocumentFrame&) { SaveDocumentAs(); });
+  Command& save = AddForEditor(
+      file, tr("&Save"), "save", QKeySequence::Save, [this](DocumentFrame&) { SaveDocument(); },
+      [this](LibraryTab&) { SaveLibrary(); });
+  AddForEditor(
+      file, tr("Save &As…"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_S),
+      [this](DocumentFrame&) { SaveDocumentAs(); }, [this](LibraryTab&) { SaveLibraryAs(); });
   AddForDocument(file, tr("&What will be saved…"), nullptr, QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_S),
                  [this](DocumentFrame& frame) { ShowChanges(frame); });
   file->addSeparator();
@@ -130,12 +158,18 @@ void MainWindow::BuildMenus() {
 
 void MainWindow::BuildEditMenu() {
   QMenu* edit = menuBar()->addMenu(tr("&Edit"));
-  Command& undo =
-      AddForDocument(edit, tr("&Undo"), "undo", QKeySequence::Undo, [](DocumentFrame& frame) { frame.Undo(); });
-  undo.enabled = [this] { return Frame() && Frame()->Session().Steps().CanUndo(); };
-  Command& redo =
-      AddForDocument(edit, tr("&Redo"), "redo", QKeySequence::Redo, [](DocumentFrame& frame) { frame.Redo(); });
-  redo.enabled = [this] { return Frame() && Frame()->Session().Steps().CanRedo(); };
+  Command& undo = AddForEditor(
+      edit, tr("&Undo"), "undo", QKeySequence::Undo, [](DocumentFrame& frame) { frame.Undo(); },
+      [](LibraryTab& library) { library.Undo(); });
+  undo.enabled = [this] {
+    return Frame() ? Frame()->Session().Steps().CanUndo() : ShownLibrary() && ShownLibrary()->Editor().CanUndo();
+  };
+  Command& redo = AddForEditor(
+      edit, tr("&Redo"), "redo", QKeySequence::Redo, [](DocumentFrame& frame) { frame.Redo(); },
+      [](LibraryTab& library) { library.Redo(); });
+  redo.enabled = [this] {
+    return Frame() ? Frame()->Session().Steps().CanRedo() : ShownLibrary() && ShownLibrary()->Editor().CanRedo();
+  };
   redo.action->setShortcuts({QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_Z), QKeySequence(Qt::CTRL | Qt::Key_Y)});
   undo.action->setObjectName("Undo");
   redo.action->setObjectName("Redo");
@@ -360,20 +394,24 @@ void MainWindow::SyncCommands() {
     }
   }
   const DocumentFrame* current = Frame();
+  const LibraryTab* library = ShownLibrary();
   const auto named = [](const QString& text, const std::string& step) {
     return step.empty() ? text : QString("%1 %2").arg(text, Translated(step));
   };
   if (auto* undo = findChild<QAction*>("Undo"))
-    undo->setText(named(tr("&Undo"), current ? current->Session().Steps().UndoName() : std::string()));
+    undo->setText(named(tr("&Undo"), current   ? current->Session().Steps().UndoName()
+                                     : library ? library->Editor().UndoName()
+                                               : std::string()));
   if (auto* redo = findChild<QAction*>("Redo"))
-    redo->setText(named(tr("&Redo"), current ? current->Session().Steps().RedoName() : std::string()));
+    redo->setText(named(tr("&Redo"), current   ? current->Session().Steps().RedoName()
+                                     : library ? library->Editor().RedoName()
+                                               : std::string()));
   for (int i = 0; i < tabs_->count(); ++i) {
-    const auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i));
-    const auto* viewer = qobject_cast<DataViewer*>(tabs_->widget(i));
-    tabs_->setTabText(i, QString(frame ? frame->Title() : viewer->Title()).replace("&", "&&"));
-    tabs_->setTabToolTip(i, ToQt(frame ? frame->Session().Path() : viewer->Path()));
+    const auto [title, path] = TitleAndPath(tabs_->widget(i));
+    tabs_->setTabText(i, QString(title).replace("&", "&&"));
+    tabs_->setTabToolTip(i, path);
   }
-  const QString title = current ? current->Title() : Viewer() ? Viewer()->Title() : QString();
+  const QString title = TitleAndPath(tabs_->currentWidget()).first;
   setWindowTitle(title.isEmpty() ? QString("Quarzel") : tr("%1 - Quarzel").arg(title));
   setWindowModified(false);
   if (welcome_) {

@@ -20,11 +20,13 @@
 #include <QToolBar>
 
 #include "document/edit_session.h"
+#include "libraries/library_kinds.h"
 #include "platform/files.h"
 #include "platform/text_fields.h"
 #include "shell/changes_dialog.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
+#include "shell/library_tab.h"
 #include "shell/program.h"
 #include "shell/run/document_run.h"
 #include "shell/welcome_page.h"
@@ -58,11 +60,31 @@ bool IsText(const std::string& path) {
   return WhyNoText({begin.constData(), static_cast<std::size_t>(begin.size())}).empty();
 }
 
+/// Setups, and the libraries that setups use.
+std::string OpenFilter() {
+  std::string filter = "Tervane  Flow Model(*.tvd)|*.tvd|";
+  for (const LibraryKind* kind : LibraryKinds())
+    filter += std::string(kind->filter.substr(0, kind->filter.find("All Files")));
+  return filter + "All Files (*.*)|*||";
+}
+
+const LibraryKind* KindOf(const QString& path) { return LibraryKindOf(FromQt(path)); }
+
+/// Asks whether changes are to be saved before they go.
+int AskForChanges(const QString& name, QWidget* parent) {
+  QMessageBox box(QMessageBox::Question, MainWindow::tr("Close"),
+                  MainWindow::tr("Save the changes to %1 before it is closed?").arg(name),
+                  QMessageBox::Save | QMessageBox::Discard | QMessageBox::Cancel, parent);
+  box.setInformativeText(MainWindow::tr("Changes that are not saved are lost."));
+  return box.exec();
+}
+
 QStringList DroppedFiles(const QMimeData* data) {
   QStringList paths;
   for (const QUrl& url : data->urls()) {
     const QString path = url.toLocalFile();
-    if (url.isLocalFile() && (path.endsWith(".tvd", Qt::CaseInsensitive) || IsDataFile(path))) paths << path;
+    if (url.isLocalFile() && (path.endsWith(".tvd", Qt::CaseInsensitive) || IsDataFile(path) || KindOf(path)))
+      paths << path;
   }
   return paths;
 }
@@ -218,6 +240,7 @@ bool MainWindow::ShowDataFile(const QString& path) {
     host_.Tell("No file is chosen.", Host::Icon::Warning);
     return false;
   }
+  if (const LibraryKind* kind = KindOf(path)) return OpenLibrary(*kind, path);
   for (int i = 0; i < tabs_->count(); ++i) {
     auto* viewer = qobject_cast<DataViewer*>(tabs_->widget(i));
     if (!viewer || (viewer->Path() != file && !IsSameFile(viewer->Path(), file))) continue;
@@ -243,7 +266,65 @@ bool MainWindow::ShowDataFile(const QString& path) {
   return false;
 }
 
-bool MainWindow::OpenFile(const QString& path) { return IsDataFile(path) ? ShowDataFile(path) : OpenDocument(path); }
+bool MainWindow::OpenFile(const QString& path) {
+  return IsDataFile(path) || KindOf(path) ? ShowDataFile(path) : OpenDocument(path);
+}
+
+LibraryTab* MainWindow::ShownLibrary() const { return qobject_cast<LibraryTab*>(tabs_->currentWidget()); }
+
+bool MainWindow::OpenLibrary(const LibraryKind& kind, const QString& path) {
+  const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
+  for (int i = 0; i < tabs_->count(); ++i) {
+    auto* library = qobject_cast<LibraryTab*>(tabs_->widget(i));
+    if (!library || (library->Path() != file && !IsSameFile(library->Path(), file))) continue;
+    tabs_->setCurrentIndex(i);
+    library->CheckDisk();
+    return true;
+  }
+  auto library = std::make_unique<LibraryTab>(kind, file, host_);
+  if (!library->Editor().Problem().empty()) {
+    host_.Tell(library->Editor().Problem(), Host::Icon::Error);
+    return false;
+  }
+  connect(library.get(), &LibraryTab::StateChanged, this, &MainWindow::SyncCommands);
+  const QString title = library->Title();
+  tabs_->setCurrentIndex(tabs_->addTab(library.release(), title));
+  SyncCommands();
+  return true;
+}
+
+bool MainWindow::SaveLibrary() {
+  LibraryTab* library = ShownLibrary();
+  if (!library) return false;
+  library->Commit();
+  if (library->Editor().IsOtherOnDisk()) {
+    const QString question = tr("Another program has changed %1 since it was read. Save over it?").arg(library->Name());
+    if (host_.Ask(FromQt(question), Host::Icon::Warning, Host::Buttons::YesNo) != Host::Answer::Yes) return false;
+  }
+  return library->Save(library->Path());
+}
+
+bool MainWindow::SaveLibraryAs() {
+  LibraryTab* library = ShownLibrary();
+  if (!library) return false;
+  const LibraryKind& kind = library->Editor().Kind();
+  const auto path =
+      host_.AskFileToSave({"Save As", std::string(kind.filter), std::string(kind.extension), library->Path()});
+  return path && library->Save(*path);
+}
+
+bool MainWindow::CloseLibrary(LibraryTab* library) {
+  tabs_->setCurrentWidget(library);
+  library->Commit();
+  if (library->Editor().IsModified()) {
+    const int answer = AskForChanges(library->Name(), this);
+    if (answer == QMessageBox::Save && !SaveLibrary()) return false;
+    if (answer != QMessageBox::Save && answer != QMessageBox::Discard) return false;
+  }
+  delete library;
+  SyncCommands();
+  return true;
+}
 
 void MainWindow::ReloadDocument(DocumentFrame* frame) {
   const QString path = ToQt(frame->Session().Path());
@@ -279,6 +360,7 @@ void MainWindow::ShowChanges(DocumentFrame& frame) {
 
 bool MainWindow::CloseTab(QWidget* tab) {
   if (auto* frame = qobject_cast<DocumentFrame*>(tab)) return CloseDocument(frame);
+  if (auto* library = qobject_cast<LibraryTab*>(tab)) return CloseLibrary(library);
   delete tab;
   SyncCommands();
   return true;
@@ -289,11 +371,7 @@ bool MainWindow::CloseDocument(DocumentFrame* frame) {
   tabs_->setCurrentWidget(frame);
   frame->Commit();
   if (frame->Session().IsModified()) {
-    QMessageBox box(QMessageBox::Question, tr("Close"),
-                    tr("Save the changes to %1 before it is closed?").arg(frame->Name()),
-                    QMessageBox::Save | QMessageBox::Discard | QMessageBox::Cancel, this);
-    box.setInformativeText(tr("Changes that are not saved are lost."));
-    const int answer = box.exec();
+    const int answer = AskForChanges(frame->Name(), this);
     if (answer == QMessageBox::Save && !SaveDocument()) return false;
     if (answer != QMessageBox::Save && answer != QMessageBox::Discard) return false;
   }
@@ -326,6 +404,7 @@ void MainWindow::changeEvent(QEvent* event) {
   if (event->type() != QEvent::ActivationChange || !isActiveWindow()) return;
   if (Frame()) Frame()->CheckDisk();
   if (Viewer()) Viewer()->Reload(false);
+  if (ShownLibrary()) ShownLibrary()->CheckDisk();
 }
 
 void MainWindow::dragEnterEvent(QDragEnterEvent* event) {
@@ -356,10 +435,13 @@ void MainWindow::Restyle() {
   connect(welcome_, &WelcomePage::NewWanted, this, &MainWindow::NewDocument);
   connect(welcome_, &WelcomePage::FileWanted, this, &MainWindow::OpenDocument);
   connect(welcome_, &WelcomePage::OpenWanted, this, [this] {
-    if (const auto path = host_.AskFileToOpen({"Open", kSetupFilter, "tvd", {}})) OpenDocument(ToQt(*path));
+    if (const auto path = host_.AskFileToOpen({"Open", OpenFilter(), "tvd", {}})) OpenFile(ToQt(*path));
   });
   for (int i = 0; i < tabs_->count(); ++i)
-    if (auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i))) frame->Redraw();
+    if (auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i)))
+      frame->Redraw();
+    else if (auto* library = qobject_cast<LibraryTab*>(tabs_->widget(i)))
+      library->Redraw();
   SyncCommands();
 }
 

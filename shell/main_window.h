@@ -22,6 +22,8 @@ class CExecuteEngineFlagsKvf;
 class DataViewer;
 class DocumentFrame;
 class EditSession;
+class LibraryTab;
+struct LibraryKind;
 class Program;
 class WelcomePage;
 
@@ -42,14 +44,21 @@ class MainWindow : public QMainWindow {
   /// Shows a data file in a tab of its own, a text file in the desktop's editor. False when neither can be done; the
   /// user has been told why.
   bool ShowDataFile(const QString& path);
-  /// One or the other, by the file's name.
+  /// Opens a library of named entries in a tab of its own, or shows the one in which it is open.
+  bool OpenLibrary(const LibraryKind& kind, const QString& path);
+  /// One of these, by the file's name.
   bool OpenFile(const QString& path);
   /// Offers what a crash left of setups that nobody opens by name.
   void OfferRecoveries();
   bool SaveDocument();
   bool SaveDocumentAs();
+  /// The library that is shown; null where there is none.
+  LibraryTab* ShownLibrary() const;
+  bool SaveLibrary();
+  bool SaveLibraryAs();
   /// False when the user wants to go on with it.
   bool CloseDocument(DocumentFrame* frame);
+  bool CloseLibrary(LibraryTab* library);
   /// The same of any tab.
   bool CloseTab(QWidget* tab);
 
@@ -78,6 +87,9 @@ class MainWindow : public QMainWindow {
   /// A command on the current document.
   Command& AddForDocument(QMenu* menu, const QString& text, const char* icon, const QKeySequence& keys,
                           std::function<void(DocumentFrame&)> run);
+  /// A command on the current document or library.
+  Command& AddForEditor(QMenu* menu, const QString& text, const char* icon, const QKeySequence& keys,
+                        std::function<void(DocumentFrame&)> ofDocument, std::function<void(LibraryTab&)> ofLibrary);
   void FillRecentMenu();
   void FillWindowMenu();
   void SyncCommands();

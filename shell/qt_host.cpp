@@ -11,6 +11,7 @@
 #include <QUrl>
 
 #include "shell/item_dialog.h"
+#include "shell/library_dialog.h"
 #include "shell/widgets/background.h"
 #include "shell/widgets/qt_text.h"
 
@@ -95,6 +96,11 @@ std::optional<std::string> QtHost::AskFileToSave(const FileQuestion& question) {
 
 std::optional<int> QtHost::AskItem(const ItemQuestion& question) {
   ItemDialog dialog(question, window_);
+  return dialog.exec() == QDialog::Accepted ? std::optional(dialog.Chosen()) : std::nullopt;
+}
+
+std::optional<Host::LibraryChoice> QtHost::SelectLibraryEntry(const LibraryQuestion& question) {
+  LibraryDialog dialog(question, *this, window_);
   return dialog.exec() == QDialog::Accepted ? std::optional(dialog.Chosen()) : std::nullopt;
 }
 

@@ -19,6 +19,7 @@ class QtHost : public Host {
   std::optional<std::string> AskFileToOpen(const FileQuestion& question) override;
   std::optional<std::string> AskFileToSave(const FileQuestion& question) override;
   std::optional<int> AskItem(const ItemQuestion& question) override;
+  std::optional<LibraryChoice> SelectLibraryEntry(const LibraryQuestion& question) override;
   void OpenBrowser(const std::string& address) override;
   bool Compute(const std::shared_ptr<Computation>& computation) override;
   std::string Setting(const std::string& name) const override;

@@ -295,5 +295,27 @@ TEST(DataCommands, ARasterThatIsRefusedWritesNothing) {
   EXPECT_THAT(Tervane({"import", "grid", raster, out, "--item", "999"}).err, HasSubstr("--force"));
 }
 
+TEST(DataCommands, InfoTellsTheEntriesOfALibrary) {
+  const TempFolder folder;
+  const std::string path = folder.Write("crops.etv",
+                                        "target TERVANE_VEGETATION {\nsection Vegetation_1 {\nName = \"Maize\"\n"
+                                        "Stage = 0, 0.1, 0.2, 0.3\nStage = 150, 4.0, 1.0, 1.2\n}\n"
+                                        "section Vegetation_2 {\nName = \"Empty\"\n}\n}\n");
+  const Outcome text = Tervane({"data", "info", path});
+  EXPECT_EQ(text.status, kDone);
+  EXPECT_EQ(text.out, path + ": 2 vegetations\nMaize: 2 stages, 150 days\nEmpty: 0 stages\n");
+  EXPECT_EQ(text.err, path + ":7: Vegetation \"Empty\": it has no stages\n");
+
+  rapidjson::Document json;
+  json.Parse(Tervane({"data", "info", path, "--json"}).out.c_str());
+  ASSERT_FALSE(json.HasParseError());
+  EXPECT_STREQ(json["vegetations"][0]["name"].GetString(), "Maize");
+  EXPECT_EQ(json["vegetations"][0]["length"].GetDouble(), 150);
+
+  const Outcome wrong = Tervane({"data", "info", folder.Write("setup.etv", "target TERVANE_FLOWMODEL {\n}\n")});
+  EXPECT_EQ(wrong.status, kCouldNot);
+  EXPECT_THAT(wrong.err, HasSubstr("setup.etv is no vegetation property file: it has no target TERVANE_VEGETATION"));
+}
+
 }  // namespace
 }  // namespace tervane

@@ -6,6 +6,8 @@
 
 #include <fmt/format.h>
 
+#include "libraries/library_kind.h"
+
 namespace tervane::test {
 
 namespace {
@@ -32,6 +34,9 @@ std::optional<std::string> ScriptedHost::AskFileToSave(const FileQuestion& quest
 std::optional<int> ScriptedHost::AskItem(const ItemQuestion& question) {
   items_ = question;
   return Next<std::optional<int>>(question.title);
+}
+std::optional<Host::LibraryChoice> ScriptedHost::SelectLibraryEntry(const LibraryQuestion& question) {
+  return Next<std::optional<LibraryChoice>>(std::string(question.kind.name));
 }
 void ScriptedHost::OpenBrowser(const std::string& address) { Unexpected(address); }
 std::string ScriptedHost::Setting(const std::string&) const { return {}; }

@@ -19,7 +19,7 @@ namespace tervane::test {
 /// A host that answers by a script, question after question; one that the script does not have fails the test.
 class ScriptedHost : public Host {
  public:
-  using Reply = std::variant<Answer, std::optional<std::string>, std::optional<int>>;
+  using Reply = std::variant<Answer, std::optional<std::string>, std::optional<int>, std::optional<LibraryChoice>>;
 
   /// The next question holds `part` in its text or title.
   void Expect(std::string part, Reply reply) { script_.push_back({std::move(part), std::move(reply)}); }
@@ -32,6 +32,7 @@ class ScriptedHost : public Host {
   std::optional<std::string> AskFileToOpen(const FileQuestion& question) override;
   std::optional<std::string> AskFileToSave(const FileQuestion& question) override;
   std::optional<int> AskItem(const ItemQuestion& question) override;
+  std::optional<LibraryChoice> SelectLibraryEntry(const LibraryQuestion& question) override;
   void OpenBrowser(const std::string& address) override;
   std::string Setting(const std::string& name) const override;
   void SetSetting(const std::string& name, const std::string& value) override;
