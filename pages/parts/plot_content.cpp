@@ -254,7 +254,7 @@ Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& 
           },
           [&filler, &owner] {
             std::vector<std::string> options = ZoneItemTitles(owner);
-            // A name that nobody bears stands behind the others until another one is chosen.
+            // A name that no zone or station has is listed last until another one is chosen.
             if (std::ranges::find(options, filler) == options.end())
               options.push_back(filler.empty() ? filler : filler + " (not in the list)");
             return options;

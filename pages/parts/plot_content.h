@@ -38,7 +38,7 @@ Control& UnitKeyChoice(PageForm& form, const std::string& label, const char* key
 
 /// Which zone or station of `owner` fills the gaps between polygons.
 Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& owner);
-/// Where nobody bears that name, the first fills them.
+/// Sets `filler` to the first zone or station when none has that name.
 void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner);
 
 /// Looks for zones or stations while the user may watch and give up; then they are unreadable.
