@@ -25,7 +25,7 @@ constexpr void (*kFiles[])(CommandOffers&) = {
     OfferDataCommands,  OfferImports,        OfferExportCommand, OfferCompletion,
 };
 
-/// Quantities whose names hold a word that was typed, for who knows no code.
+/// Quantities whose names contain the typed word, for users who do not know the codes.
 std::string NearQuantities(const std::string& typed) {
   std::string near;
   const std::string lower = LowerCase(typed);

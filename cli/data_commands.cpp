@@ -159,7 +159,7 @@ std::string JsonBox(const Envelope& box) {
       {ShortestNumber(box.xMin), ShortestNumber(box.yMin), ShortestNumber(box.xMax), ShortestNumber(box.yMax)});
 }
 
-int TellPoints(const std::string& path, bool json, Streams streams) {
+int PrintPoints(const std::string& path, bool json, Streams streams) {
   const auto facts = XyzFactsOf(path);
   if (!facts->error.empty()) {
     fmt::print(streams.err, "{}\n", facts->error);
@@ -178,7 +178,7 @@ int TellPoints(const std::string& path, bool json, Streams streams) {
   return kDone;
 }
 
-int TellShapes(const std::string& path, bool json, Streams streams) {
+int PrintShapes(const std::string& path, bool json, Streams streams) {
   const auto facts = ShapeFactsOf(path);
   if (!facts->error.empty()) {
     fmt::print(streams.err, "{}\n", facts->error);
@@ -221,9 +221,9 @@ bool HasExtension(const std::string& path, std::initializer_list<std::string_vie
 }
 
 int DataInfoCommand(const std::string& path, bool json, Streams streams) {
-  if (const LibraryKind* kind = LibraryKindOf(path)) return TellLibrary(*kind, path, json, streams);
-  if (HasExtension(path, {".shp"})) return TellShapes(path, json, streams);
-  if (HasExtension(path, {".txt", ".xyz"})) return TellPoints(path, json, streams);
+  if (const LibraryKind* kind = LibraryKindOf(path)) return PrintLibrary(*kind, path, json, streams);
+  if (HasExtension(path, {".shp"})) return PrintShapes(path, json, streams);
+  if (HasExtension(path, {".txt", ".xyz"})) return PrintPoints(path, json, streams);
   DataFile file;
   if (!OpenDataFile(file, path, streams)) return kCouldNot;
   json ? WriteInfoAsJson(file, streams.out) : WriteInfoAsText(file, streams.out);
@@ -233,8 +233,8 @@ int DataInfoCommand(const std::string& path, bool json, Streams streams) {
 int DataStatsCommand(const std::string& path, Streams streams) {
   /// Of a file with more steps, only the whole is told.
   constexpr std::size_t kMostStepsTold = 24;
-  if (HasExtension(path, {".txt", ".xyz"})) return TellPoints(path, false, streams);
-  if (HasExtension(path, {".shp"})) return TellShapes(path, false, streams);
+  if (HasExtension(path, {".txt", ".xyz"})) return PrintPoints(path, false, streams);
+  if (HasExtension(path, {".shp"})) return PrintShapes(path, false, streams);
   DataFile file;
   if (!OpenDataFile(file, path, streams)) return kCouldNot;
   for (std::size_t i = 0; i < file.Items().size(); ++i) {

@@ -66,8 +66,8 @@ std::string Json(const SetupDifference& difference) {
 int DiffCommand(const std::string& from, const std::string& to, bool json, Streams streams) {
   CFlowModelDoc a, b;
   if (!OpenSetup(a, from, streams) || !OpenSetup(b, to, streams)) return kCouldNot;
-  TellReport(a, streams);
-  TellReport(b, streams);
+  PrintLoadReport(a, streams);
+  PrintLoadReport(b, streams);
   const WrittenSetup writtenA(a), writtenB(b);
   const std::vector<SetupDifference> differences = CompareSetups(writtenA.Target(), writtenB.Target(), KeyReference());
   if (json) {

@@ -49,7 +49,7 @@ int ConvertCommand(const std::string& in, const std::string& out, bool force, St
   // Converting a file in its place keeps the original beside it.
   const bool isInPlace = in == out || IsSameFile(in, out);
   if (isInPlace ? RefuseHeld(out, force, streams) : RefuseToReplace(out, force, streams)) return kCouldNot;
-  TellReport(document, streams);
+  PrintLoadReport(document, streams);
   return Save(document, out, streams);
 }
 

@@ -35,7 +35,7 @@ std::string LengthText(const LibraryColumn& column, const LibraryEntry& entry) {
 
 }  // namespace
 
-int TellLibrary(const LibraryKind& kind, const std::string& path, bool json, Streams streams) {
+int PrintLibrary(const LibraryKind& kind, const std::string& path, bool json, Streams streams) {
   Library library(kind);
   if (const std::string problem = ReadLibrary(path, library); !problem.empty()) {
     fmt::print(streams.err, "{}\n", problem);

@@ -11,6 +11,6 @@
 namespace tervane {
 
 /// Tells the entries of a library, and on the error stream what is wrong with them. A status of the commands.
-int TellLibrary(const LibraryKind& kind, const std::string& path, bool json, Streams streams);
+int PrintLibrary(const LibraryKind& kind, const std::string& path, bool json, Streams streams);
 
 }  // namespace tervane

@@ -15,9 +15,9 @@ namespace {
 int PageCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
-  TellThatThereIsAReport(document, streams);
+  PrintLoadReportHint(document, streams);
   ReadProcessedData(document, streams);
-  CYbSEKvfBase* node = FindNodeOrTell(document, ParseSetupPath(typed), typed, streams);
+  CYbSEKvfBase* node = FindNodeOrReport(document, ParseSetupPath(typed), typed, streams);
   if (!node) return kCouldNot;
   const PageClass* pageClass = PageClassOf(*node);
   NobodyToAsk host;

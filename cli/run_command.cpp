@@ -71,7 +71,7 @@ void TerminalShell::Start(const CYbSimpleLaunch& launch, bool /*showsProgress*/)
     return;
   }
   Follow(run);
-  run.MarkTold();
+  run.MarkReported();
   const RunOutcome outcome = run.Outcome();
   if (outcome != RunOutcome::NotStarted) status_ = outcome == RunOutcome::Done ? kDone : kFindings;
   Tell(run, OutcomeSentence(run.State()));

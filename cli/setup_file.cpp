@@ -29,7 +29,7 @@ bool RefuseHeld(const std::string& file, bool force, Streams streams) {
   return holder.has_value();
 }
 
-void TellReport(const CFlowModelDoc& document, Streams streams) {
+void PrintLoadReport(const CFlowModelDoc& document, Streams streams) {
   const LoadReport& report = document.Report();
   for (const LoadReport::Entry& entry : report.entries)
     fmt::print(streams.err, "{}:{}: {}{}{}: {}\n", document.PathName(), entry.line, entry.path,
@@ -38,7 +38,7 @@ void TellReport(const CFlowModelDoc& document, Streams streams) {
     fmt::print(streams.err, "{}:{}: {}\n", document.PathName(), unread.line, unread.text);
 }
 
-void TellThatThereIsAReport(const CFlowModelDoc& document, Streams streams) {
+void PrintLoadReportHint(const CFlowModelDoc& document, Streams streams) {
   const LoadReport& report = document.Report();
   if (report.IsEmpty()) return;
   fmt::print(streams.err, "{}: {} notes of the reading, {} things that nothing reads: tervane check tells them\n",
@@ -70,8 +70,8 @@ std::string Suggestion(const std::string& typed, const std::vector<std::string>&
 
 }  // namespace
 
-CYbSEKvfBase* FindNodeOrTell(CFlowModelDoc& document, const SetupPath& path, const std::string& typed,
-                             Streams streams) {
+CYbSEKvfBase* FindNodeOrReport(CFlowModelDoc& document, const SetupPath& path, const std::string& typed,
+                               Streams streams) {
   if (!path.error.empty()) {
     fmt::print(streams.err, "{}: {}\n", typed, path.error);
     return nullptr;
@@ -109,7 +109,7 @@ KvfSection* WrittenSetup::SectionOf(const CYbSEKvfBase& node) const {
   return AsSection(FindKvfNode(*section, false, name, instance));
 }
 
-KvfNode* FindKeyOrTell(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams) {
+KvfNode* FindKeyOrReport(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams) {
   if (key.name.empty()) {
     fmt::print(streams.err, "{}: a key was expected behind the section, as in SimSpec:ModelType\n", typed);
     return nullptr;

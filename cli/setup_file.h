@@ -15,10 +15,10 @@ bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams
 /// True, with a message, when an editor that runs has the setup open: its next save would undo what is written here.
 bool RefuseHeld(const std::string& file, bool force, Streams streams);
 
-/// Tells what the user should know of the loading, a line each; for commands that write or compare.
-void TellReport(const CFlowModelDoc& document, Streams streams);
+/// Prints the notes on the loading to the error stream, a line each; for commands that write or compare.
+void PrintLoadReport(const CFlowModelDoc& document, Streams streams);
 /// The same in one line, for commands that only show something.
-void TellThatThereIsAReport(const CFlowModelDoc& document, Streams streams);
+void PrintLoadReportHint(const CFlowModelDoc& document, Streams streams);
 
 /// Reads what the preprocessor left of the setup, for commands that show places; tells why where there is a report that
 /// cannot be read.
@@ -26,7 +26,8 @@ void ReadProcessedData(const CFlowModelDoc& document, Streams streams);
 
 /// A place as a person types it, found in a tree; null, with a message that names what comes near, when it is not
 /// there.
-CYbSEKvfBase* FindNodeOrTell(CFlowModelDoc& document, const SetupPath& path, const std::string& typed, Streams streams);
+CYbSEKvfBase* FindNodeOrReport(CFlowModelDoc& document, const SetupPath& path, const std::string& typed,
+                               Streams streams);
 
 /// A file as the document would save it in its own folder.
 class WrittenSetup {
@@ -47,6 +48,6 @@ class WrittenSetup {
 };
 
 /// The key that a path names in its section; null, with a message, when it is not there.
-KvfNode* FindKeyOrTell(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams);
+KvfNode* FindKeyOrReport(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams);
 
 }  // namespace tervane

@@ -24,7 +24,7 @@ struct TreeOptions {
 int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
-  TellThatThereIsAReport(document, streams);
+  PrintLoadReportHint(document, streams);
   ReadProcessedData(document, streams);
   std::vector<std::string> json;
   WalkNodes(document.Root(), [&](const NodePlace& place) {
@@ -70,9 +70,9 @@ void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyRefe
 int ShowCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
-  TellThatThereIsAReport(document, streams);
+  PrintLoadReportHint(document, streams);
   const SetupPath path = ParseSetupPath(typed);
-  const CYbSEKvfBase* wanted = FindNodeOrTell(document, path, typed, streams);
+  const CYbSEKvfBase* wanted = FindNodeOrReport(document, path, typed, streams);
   if (!wanted) return kCouldNot;
   if (!path.key.name.empty()) return GetCommand(file, typed, streams);
   const WrittenSetup written(document);

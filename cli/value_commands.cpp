@@ -17,13 +17,13 @@ namespace tervane {
 int GetCommand(const std::string& file, const std::string& typed, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
-  TellThatThereIsAReport(document, streams);
+  PrintLoadReportHint(document, streams);
   const SetupPath path = ParseSetupPath(typed);
-  const CYbSEKvfBase* node = FindNodeOrTell(document, path, typed, streams);
+  const CYbSEKvfBase* node = FindNodeOrReport(document, path, typed, streams);
   if (!node) return kCouldNot;
   const WrittenSetup written(document);
   KvfSection* section = written.SectionOf(*node);
-  const KvfNode* key = section ? FindKeyOrTell(*section, path.key, typed, streams) : nullptr;
+  const KvfNode* key = section ? FindKeyOrReport(*section, path.key, typed, streams) : nullptr;
   if (!key) return kCouldNot;
   fmt::print(streams.out, "{}\n", PlainValuesText(*key));
   return kDone;
@@ -90,16 +90,16 @@ int SetCommand(const std::string& file, const std::string& typed, const std::str
   if (RefuseHeld(file, force, streams)) return kCouldNot;
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
-  TellReport(document, streams);
+  PrintLoadReport(document, streams);
   const SetupPath path = ParseSetupPath(typed);
-  const CYbSEKvfBase* node = FindNodeOrTell(document, path, typed, streams);
+  const CYbSEKvfBase* node = FindNodeOrReport(document, path, typed, streams);
   if (!node) return kCouldNot;
 
   // The value is put where the file would hold it, and that file is read as any other: so a key means here what it
   // means to the nodes.
   const WrittenSetup written(document);
   KvfSection* section = written.SectionOf(*node);
-  KvfNode* key = section ? FindKeyOrTell(*section, path.key, typed, streams) : nullptr;
+  KvfNode* key = section ? FindKeyOrReport(*section, path.key, typed, streams) : nullptr;
   if (!key) return kCouldNot;
   if (const std::string expected = TakeValues(value, written.File(), *key); !expected.empty()) {
     fmt::print(streams.err, "{} = {}: {} was expected\n", typed, value, expected);

@@ -44,13 +44,13 @@ void Write(const Explanation& why, const std::string& path, Streams streams) {
 int WhyCommand(const std::string& file, const std::string& typed, bool json, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
-  TellThatThereIsAReport(document, streams);
+  PrintLoadReportHint(document, streams);
   std::vector<MissingNode> told;
   if (typed.empty()) {
     told = WhatIsMissing(document);
   } else {
     const SetupPath path = ParseSetupPath(typed);
-    CYbSEKvfBase* node = FindNodeOrTell(document, path, typed, streams);
+    CYbSEKvfBase* node = FindNodeOrReport(document, path, typed, streams);
     if (!node) return kCouldNot;
     told.push_back({PathOf(*node), node->Serial(), WhyTakesPart(document, *node)});
   }

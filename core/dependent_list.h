@@ -158,7 +158,7 @@ class CTvnDependentList : public NodeBase, public ListBase {
       : NodeBase(std::move(title), std::move(sectionName), parent), masterName_(std::move(masterName)) {}
 
   ~CTvnDependentList() override {
-    // While the whole tree dies nobody is found any more.
+    // No node can be found any more while the whole tree is being destroyed.
     auto* master = Master();
     if (!master) return;
     master->RemoveDependentList(this);
@@ -294,7 +294,7 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
     }
   }
 
-  // A master follows nobody.
+  // A master list depends on no other list.
   ItemBase* CreateDependentItem(int /*id*/, const std::string& /*name*/) override { return nullptr; }
   ItemBase* FindDependentItem(int id) override {
     for (int number = 1; number <= this->GetItemCount(); ++number)
@@ -303,7 +303,7 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
   }
   void RemoveDependentItem(ItemBase* /*item*/) override {}
 
-  /// All dependents renew what follows from the items' kinds; then whoever listens is told.
+  /// All dependents renew what follows from the items' kinds; then the listeners are notified.
   void RefreshDependents() override {
     for (auto* dependent : this->DependentLists()) dependent->RefreshDependents();
     this->Notify(0, nullptr);

@@ -46,7 +46,7 @@ struct OverviewLine {
 };
 
 /// The name under which a node is found from anywhere in its tree, with what it is found as: the node's class, or a
-/// narrow class for those who stand below it. Declared once, beside that class.
+/// narrow class for code in folders below that class. Declared once, beside that class.
 template <class Node>
 struct ImportantName {
   std::string_view text;
@@ -370,8 +370,8 @@ struct NodePlace {
 /// Visits all nodes below the root, parents first, in the order of the walk.
 void WalkNodes(CYbSEKvfBase& root, const std::function<void(const NodePlace&)>& visit);
 
-/// The steps of a path to the children of a node. To be asked in the order of the walk; each child costs its own step
-/// and those that were passed over, and nobody asked costs nothing.
+/// The path steps of a node's children. Call `StepOf` in the order of the walk: a call computes the steps of the child
+/// and of the children skipped before it; nothing is computed without a call.
 class ChildSteps {
  public:
   explicit ChildSteps(const CYbSEKvfBase& parent) : parent_(parent), next_(parent.GetFirstChild()) {}

@@ -231,8 +231,8 @@ class BoxWalk {
 
 constexpr const char* kTooLarge = "a value is too large for single precision in this unit";
 
-/// Reads a box of values that stand in the file's order piece by piece, so that nobody waits long for the lock, nor for
-/// the end of what was cancelled.
+/// Reads a box of values, which are in the file's order, piece by piece: other threads get the lock soon, and a
+/// cancelled read ends soon.
 class PieceReader {
  public:
   /// `convert` gets each piece of values, at most kPiece, soon after it was read.

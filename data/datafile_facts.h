@@ -1,7 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// What the header of a data file tells, read once for all who ask while the file stays as it is.
+// What the header of a data file says, read once for all callers while the file is unchanged.
 #pragma once
 
 #include <memory>

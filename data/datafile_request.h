@@ -1,7 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// What somebody who reads a data file needs of it.
+// What a reader of a data file requires of it.
 #pragma once
 
 #include <cstddef>

@@ -141,8 +141,8 @@ std::optional<Recovery> FindRecovery(const std::string& setup, const std::string
   AutosaveContent content;
   std::string ignored;
   if (ReadAutosave(beside, content, ignored)) {
-    // Only who holds the setup's lock keeps an autosave there, so the lock tells of an editor on another host. The
-    // folder may have another name by now: what stands beside a setup is of that setup.
+    // Only the holder of the setup's lock keeps an autosave there, so the lock shows whether an editor on another host
+    // is at work. The folder may have been renamed: an autosave beside a setup belongs to that setup.
     const bool mayBeInUse = content.process.IsOnThisHost() ? content.process.MayRun() : HolderOf(setup).has_value();
     if (!mayBeInUse && HoldsChanges(content, setup))
       found.push_back({beside, TextOfPath(fs::absolute(NativePath(setup))), TimeOf(beside)});

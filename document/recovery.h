@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 // Autosaves: a setup with its unsaved changes, kept beside it (NAME.tvd~) or in a folder of the user's. A comment in
-// front tells of which setup it was made and by whom, so that what a crash left is found again.
+// front names the setup and the process that wrote it, so that autosaves left by a crash are found again.
 #pragma once
 
 #include <chrono>

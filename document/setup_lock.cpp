@@ -98,7 +98,7 @@ void CreateWhole(const std::string& path, const std::string& content, std::error
   if (error != std::errc::file_exists) write(path);
 }
 
-/// Removes a lock of nobody. Two that meet the same one are kept apart by locking the file itself: who comes second
+/// Removes a stale lock. Two processes that find the same one are kept apart by locking the file itself: the second
 /// finds that the name leads to another file by now.
 void RemoveStale(Lock lock) {
   std::error_code error;

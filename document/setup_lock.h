@@ -1,7 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// The lock that keeps two editors from writing one setup: a small file beside it that tells who has the setup open.
+// The lock that keeps two editors from writing one setup: a small file beside it that names the holder of the setup.
 #pragma once
 
 #include <optional>
@@ -22,11 +22,11 @@ struct LockHolder {
 /// asked whether it still runs.
 std::string HolderSentence(const LockHolder& holder);
 
-/// Who holds the setup, under whichever of its names; nothing when nobody does.
+/// The holder of the setup, under any of its names; nothing when there is none.
 std::optional<LockHolder> HolderOf(const std::string& setup);
 
-/// A lock that is held. Given back by the destructor, and by the end of the process: the lock of a process that runs no
-/// more is nobody's.
+/// A lock that is held. Released by the destructor, and by the end of the process: the lock of a process that no longer
+/// runs is stale.
 class SetupLock {
  public:
   SetupLock() = default;

@@ -104,7 +104,7 @@ bool Preprocessor::Run() {
 bool Preprocessor::CheckSetup() {
   WalkNodes(document_.Root(), [&](const NodePlace& place) {
     if (!place.takesPart) return;
-    // A period that is not covered is a warning to who edits, and an end to who computes.
+    // A period that is not covered is a warning in the editor, and an error in a computation.
     const auto* file = dynamic_cast<const DataFileNode*>(&place.node);
     const bool isNeeded = file && file->IsFileUsed();
     const std::string problem =

@@ -21,7 +21,7 @@ namespace {
 using namespace std::chrono_literals;
 using Clock = std::chrono::steady_clock;
 
-/// How long who is asked to end may take for it.
+/// How long a process that was asked to end may take to do so.
 constexpr auto kGrace = 5s;
 /// How long processes of an engine that has ended may go on.
 constexpr auto kGraceOfLeft = 2s;
@@ -34,7 +34,7 @@ std::string LogBeside(const std::string& statePath) {
   return fmt::format("{}/{}.log", FolderOf(statePath), BaseNameOf(statePath));
 }
 
-/// An empty log. The old one is another file, so that who still reads it is not confused.
+/// An empty log. The old one is another file, so that its present readers are not confused.
 std::string MakeLog(const std::string& path) {
   std::error_code error;
   std::filesystem::remove(NativePath(path), error);

@@ -91,7 +91,7 @@ void RunFollower::Follow() {
   changed_.wait(lock, [this] { return isLeft_ || isEndTaken_; });
   if (!isEndTaken_) return;
   lock.unlock();
-  run_.MarkTold();
+  run_.MarkReported();
 }
 
 bool RunFollower::ReadLog() {

@@ -26,11 +26,11 @@ struct RunNews {
   RunOutcome outcome = RunOutcome::GoingOn;  ///< Another one once the log was read to its end.
 };
 
-/// Follows a run in a thread of its own, so that neither an engine that prints without end nor a slow disk holds up who
-/// shows it.
+/// Follows a run in a thread of its own, so that neither an engine that prints without end nor a slow disk blocks the
+/// view of the run.
 class RunFollower {
  public:
-  /// What an engine says in messages beyond this number stands in the log alone.
+  /// Messages of an engine beyond this number are in the log only.
   static constexpr std::size_t kMostMessages = 500;
 
   explicit RunFollower(SetupRun run);

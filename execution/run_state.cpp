@@ -48,7 +48,8 @@ std::string TextOf(const RunState& state) {
              NamedLine("signal", std::to_string(state.end.signal)) +
              NamedLine("left report", state.leftReport ? "yes" : "no") +
              NamedLine("left processes", std::to_string(state.leftProcesses)) +
-             NamedLine("disk full", state.isDiskFull ? "yes" : "no") + NamedLine("told", state.isTold ? "yes" : "no");
+             NamedLine("disk full", state.isDiskFull ? "yes" : "no") +
+             NamedLine("told", state.isReported ? "yes" : "no");
   }
   // Who reads while it is written finds that the two do not fit.
   return fmt::format("{}{}{}", kFirstLine, NamedLine("check", fmt::format("{:016x}", HashOf(lines))), lines);
@@ -81,7 +82,7 @@ std::optional<RunState> StateOf(std::string_view text) {
   state.leftReport = value("left report") == "yes";
   state.leftProcesses = NumberOf<int>(lines, "left processes");
   state.isDiskFull = value("disk full") == "yes";
-  state.isTold = value("told") == "yes";
+  state.isReported = value("told") == "yes";
   return state;
 }
 

@@ -43,7 +43,7 @@ struct RunState {
   bool leftReport = false;
   int leftProcesses = 0;    ///< How many of its processes the engine had not waited for.
   bool isDiskFull = false;  ///< At its end.
-  bool isTold = false;      ///< The user knows of its end.
+  bool isReported = false;  ///< The user knows of its end.
 
   bool HasEnded() const { return ended != 0; }
 };
@@ -56,7 +56,7 @@ bool MayStillRun(const RunState& state);
 std::optional<RunState> ReadRunState(const std::string& path, std::string& problem);
 
 /// The state file held open for writing, so that nobody else begins a run. It is written in place, with room reserved:
-/// the end of a run can be told on a full disk.
+/// the end of a run can be recorded on a full disk.
 class HeldRunState {
  public:
   enum class Outcome { Held, HeldByOther, CannotWrite };

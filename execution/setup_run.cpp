@@ -84,14 +84,14 @@ bool SetupRun::Start(const RunRequest& request, std::string& problem) {
   state_.problem = problem = WhyNotStarted(runner, error);
   state_.ended = NowInMilliseconds();
   outcome_ = RunOutcome::NotStarted;
-  MarkTold();
+  MarkReported();
   return false;
 }
 
 bool SetupRun::Find(const RunFiles& files) {
   std::string problem;
   std::optional<RunState> found = ReadRunState(files.state, problem);
-  if (!found || found->isTold) return false;
+  if (!found || found->isReported) return false;
   files_ = files;
   state_ = *found;
   runner_ = {};
@@ -140,7 +140,7 @@ std::string SetupRun::Stop() {
 }
 
 void SetupRun::SendStops() {
-  // Before the runner has told of itself there is nobody to ask.
+  // No request can be sent before the runner has written its process to the state file.
   for (; state_.runner && stopsSent_ < stopsWanted_; ++stopsSent_) {
     if (MayRun(state_.runner))
       os::RequestEnd(state_.runner->process);
@@ -149,8 +149,8 @@ void SetupRun::SendStops() {
   }
 }
 
-void SetupRun::MarkTold() {
-  state_.isTold = true;
+void SetupRun::MarkReported() {
+  state_.isReported = true;
   HeldRunState held;
   std::string ignored;
   if (held.Hold(files_.state, kPatience, ignored) != HeldRunState::Outcome::Held) return;

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 // One run of an engine: how it is started, followed and stopped. The engine is a child of a small runner program, which
-// nobody's end disturbs; all that is known of it stands in files.
+// outlives the program that started it; all that is known of the run is in files.
 #pragma once
 
 #include <optional>
@@ -29,13 +29,13 @@ struct RunRequest {
 std::optional<RunRequest> RequestOf(const CYbSimpleLaunch& launch, const std::string& resultFolder,
                                     const std::string& enginePath, std::string& problem);
 
-/// A run that was started or found, by whom ever. Each `Look` reads the files anew; nothing waits.
+/// A run that this or another program started. Each `Look` reads the files anew; nothing waits.
 class SetupRun {
  public:
   /// Starts the engine. False with the problem when it could not be started, also because another run of this setup
   /// goes on; what the engine itself meets at its start shows at a later look.
   bool Start(const RunRequest& request, std::string& problem);
-  /// The run that the files tell of: one that goes on, or one whose end nobody was told yet. False when there is none.
+  /// Takes the run in the files: one that goes on, or one whose end was not reported yet. False when there is none.
   bool Find(const RunFiles& files);
 
   const RunFiles& Files() const { return files_; }
@@ -44,11 +44,11 @@ class SetupRun {
   const RunState& State() const { return state_; }
   RunOutcome Outcome() const { return outcome_; }
 
-  /// Asks the engine and all that it has started to end; who has not a few seconds later is ended by force. A second
-  /// time: without waiting. Gives why it cannot be done from here, or nothing.
+  /// Asks the engine and all that it has started to end; those still running a few seconds later are killed. A
+  /// second call kills without waiting. Returns why it cannot be done from here, or "".
   std::string Stop();
   /// Notes in the files that the user knows how it ended.
-  void MarkTold();
+  void MarkReported();
 
  private:
   bool ReadState();

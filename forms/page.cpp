@@ -42,12 +42,12 @@ std::string CYbSEDlgBase::Enter(Control& control, const std::string& typed) {
   if (!control.enter || !control.IsEnabled()) return "this value cannot be changed here";
   if (control.Text() == typed) return {};
   if (std::string expected = control.enter(typed); !expected.empty()) return expected;
-  Took(control);
+  CommitValue(control);
   return {};
 }
 
 void CYbSEDlgBase::Browse(Control& control) {
-  if (control.IsEnabled() && control.browse && control.browse(Outside())) Took(control);
+  if (control.IsEnabled() && control.browse && control.browse(Outside())) CommitValue(control);
 }
 
 std::optional<std::string> CYbSEDlgBase::AskFile(Host::FileQuestion question, const std::string& now) const {
@@ -57,7 +57,7 @@ std::optional<std::string> CYbSEDlgBase::AskFile(Host::FileQuestion question, co
   return Outside().AskFileToOpen(question);
 }
 
-void CYbSEDlgBase::Took(const Control& control) {
+void CYbSEDlgBase::CommitValue(const Control& control) {
   const int hint = control.hint | (control.then ? control.then() : 0);
   if (control.revalidates && node_.GetRoot()) node_.GetRoot()->ReValidate();
   if (control.revalidatesLater) node_.SetRevalidateAll();
@@ -87,7 +87,7 @@ std::string CYbSEDlgBase::EnterCell(const Control& table, int row, int column, c
   return {};
 }
 
-bool CYbSEDlgBase::Tell(int hint, const std::string& action) {
+bool CYbSEDlgBase::CommitTableChange(int hint, const std::string& action) {
   if (hint == 0) return false;
   SetData();
   // Without a source, so that no two operations are undone as one.
@@ -99,31 +99,32 @@ bool CYbSEDlgBase::ChangeRows(const Control& table, RowAction action, int first,
   if (!table.IsEnabled()) return false;
   const int rows = first < 1 ? 1 : std::min(last, table.table->RowCount()) - first + 1;
   const int hint = table.table->ChangeRows(action, first, last);
-  return Tell(hint, table.table->ActionName(action, rows));
+  return CommitTableChange(hint, table.table->ActionName(action, rows));
 }
 
 bool CYbSEDlgBase::ChangeRow(const Control& table, RowAction action, int row) {
-  return table.IsEnabled() && Tell(table.table->ChangeRow(action, row), table.table->ActionName(action, 1));
+  return table.IsEnabled() &&
+         CommitTableChange(table.table->ChangeRow(action, row), table.table->ActionName(action, 1));
 }
 
 CellsResult CYbSEDlgBase::Paste(const Control& table, const CellRange& selected, std::string_view text) {
   if (!table.IsEnabled()) return {};
   CellsResult result = table.table->Paste(selected, text);
-  Tell(result.hint, "Paste");
+  CommitTableChange(result.hint, "Paste");
   return result;
 }
 
 CellsResult CYbSEDlgBase::FillDown(const Control& table, const CellRange& cells) {
   if (!table.IsEnabled()) return {};
   CellsResult result = table.table->FillDown(cells);
-  Tell(result.hint, "Fill Down");
+  CommitTableChange(result.hint, "Fill Down");
   return result;
 }
 
 CellsResult CYbSEDlgBase::ClearCells(const Control& table, const CellRange& cells) {
   if (!table.IsEnabled()) return {};
   CellsResult result = table.table->Clear(cells);
-  Tell(result.hint, "Clear");
+  CommitTableChange(result.hint, "Clear");
   return result;
 }
 

@@ -31,11 +31,11 @@ struct PageContext {
   /// the user gave up.
   std::function<bool(const std::string& title, CYbSEDlgBase& form, const std::function<std::string()>& accept)>
       runDialog = {};
-  /// The page takes the place of one that the user had before him: what that one told is not told again.
+  /// The page replaces one that was shown: messages that it has shown are not shown again.
   bool isReplacement = false;
   /// The user's units; null for base units. They outlive the page.
   const DisplayUnits* displayUnits = nullptr;
-  /// Shows the page anew once the present call has returned; empty where nobody looks at it.
+  /// Shows the page anew once the present call has returned; empty where the page is not shown.
   std::function<void()> syncSoon = {};
 };
 
@@ -58,7 +58,7 @@ class CYbSEDlgBase {
   virtual void Initialize();
   /// Called when the page is shown and after every change: what the form's rules do not say themselves.
   virtual void SetData() {}
-  /// Makes the form and nothing else, for who only reads what a page holds.
+  /// Makes the form and nothing else, for callers that only read the contents of a page.
   void MakeForm();
   PageForm& Form() const { return *form_; }
 
@@ -96,10 +96,10 @@ class CYbSEDlgBase {
   virtual void Describe(PageForm& form) = 0;
 
  private:
-  /// What follows a value that was taken.
-  void Took(const Control& control);
-  /// Tells the document of a change in a table; false when there was none.
-  bool Tell(int hint, const std::string& action);
+  /// Updates the document after a control has stored a new value.
+  void CommitValue(const Control& control);
+  /// Updates the document after a change in a table; false when there was none.
+  bool CommitTableChange(int hint, const std::string& action);
 
   CYbSEKvfBase& node_;
   PageContext context_;

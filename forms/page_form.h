@@ -224,7 +224,7 @@ class PageForm {
   std::shared_ptr<PageForm> NewSubForm(CYbSEKvfBase& node) { return std::make_shared<PageForm>(node, keys_); }
   Control& SubForms(std::vector<std::shared_ptr<PageForm>> forms, std::function<int()> current);
 
-  /// A control of that kind, whose value is bound by who adds it.
+  /// A control of that kind, whose value the caller binds.
   Control& Bare(ControlKind kind, std::string label) { return Add(kind, std::move(label)); }
 
   CYbSEKvfBase& Node() const { return node_; }

@@ -70,7 +70,7 @@ void MergeCoincident(std::vector<ScatteredPoint>& points, ProgressPart progress)
   points.erase(out, points.end());
 }
 
-/// Sorts points as whoever goes through rows needs them.
+/// Sorts points by y, for walks row by row.
 void SortByY(std::vector<ScatteredPoint>& points, ProgressPart progress) {
   Sort(points, progress,
        [](const ScatteredPoint& a, const ScatteredPoint& b) { return a.y != b.y ? a.y < b.y : a.x < b.x; });

@@ -33,7 +33,7 @@ FileResult ReadXyzFile(const std::string& path, std::vector<ScatteredPoint>& poi
 FileResult ParseXyz(std::string_view text, const std::string& path, std::vector<ScatteredPoint>& points,
                     ProgressPart progress = {});
 
-/// What a text of points holds, read once for all who ask while the file stays as it is. In the file's own units.
+/// What a text of points holds, read once for all callers while the file is unchanged. In the file's own units.
 struct XyzFacts {
   std::string error;  ///< As of `ReadXyzFile`; then the rest says nothing.
   std::size_t points = 0;

@@ -210,14 +210,14 @@ void LibraryEditor::Insert(LibraryEntry entry, const std::string& action) {
   const std::size_t place = std::min(current_ + 1, library_.entries.size());
   library_.entries.insert(library_.entries.begin() + static_cast<std::ptrdiff_t>(place), std::move(entry));
   current_ = place;
-  Took(action);
+  CommitValue(action);
 }
 
 void LibraryEditor::Delete() {
   if (current_ >= library_.entries.size()) return;
   library_.DeleteEntry(current_);
   current_ = std::min(current_, std::max<std::size_t>(library_.entries.size(), 1) - 1);
-  Took(ActionName("Delete"));
+  CommitValue(ActionName("Delete"));
 }
 
 std::string LibraryEditor::ActionName(const char* verb) const {
@@ -250,7 +250,7 @@ std::unique_ptr<CYbSEDlgBase> LibraryEditor::MakePage(Host& host, std::function<
                                                       std::function<void()> soon) {
   PageContext context{document_, host,
                       [this, changed = std::move(changed)](int, const std::string& action, const void* source) {
-                        Took(action, source);
+                        CommitValue(action, source);
                         changed();
                       }};
   context.syncSoon = std::move(soon);
@@ -286,7 +286,7 @@ LibraryEditor::State LibraryEditor::Now() const {
   return state;
 }
 
-void LibraryEditor::Took(const std::string& action, const void* source) {
+void LibraryEditor::CommitValue(const std::string& action, const void* source) {
   State now = Now();
   const auto time = std::chrono::steady_clock::now();
   if (!now.HoldsSame(shadow_)) {

@@ -54,7 +54,7 @@ class LibraryEditor {
   // ---- Changes
 
   /// Takes what is different now as one step. Changes of one source in quick succession are one.
-  void Took(const std::string& action, const void* source = nullptr);
+  void CommitValue(const std::string& action, const void* source = nullptr);
   bool CanUndo() const { return !undone_.empty(); }
   bool CanRedo() const { return !redone_.empty(); }
   std::string UndoName() const { return CanUndo() ? undone_.back().action : std::string(); }

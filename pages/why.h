@@ -18,10 +18,10 @@ namespace tervane {
 struct Reason {
   bool holds = false;
   std::string text;            ///< "Overland Flow (OL) is on", "or Numeric Engine must be Tervane".
-  bool isAlternative = false;  ///< This would do instead of the reasons in front of it.
   std::string page;            ///< Title of the page that has the control; empty for what no control decides.
   std::uint64_t serial = 0;    ///< Of the node of that page; 0 where there is none.
   std::string path, key;       ///< Of the value that decides; may be empty.
+  bool isAlternative = false;  ///< This would do instead of the reasons in front of it.
 };
 
 struct Explanation {

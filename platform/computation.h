@@ -24,11 +24,11 @@ class Computation {
   Computation(const Computation&) = delete;
   Computation& operator=(const Computation&) = delete;
 
-  /// What is done, for who waits: "Reading dem.nds2".
+  /// What is done, to be shown to the waiting user: "Reading dem.nds2".
   const std::string& Title() const { return title_; }
   /// True when the result is there, or why there is none; both then stay as they are.
   bool IsDone() const { return isDone_.load(std::memory_order_acquire); }
-  /// Makes the result unless it is there; who comes while another thread makes it waits for that. False when it was
+  /// Makes the result unless it is there; a caller that comes while another thread makes it waits. False when it was
   /// cancelled: then it is as if it had never run.
   bool Run(ProgressPart progress = {}) {
     const std::lock_guard lock(mutex_);

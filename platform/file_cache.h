@@ -30,8 +30,8 @@ inline FileStamps StampsOf(const std::string& path) {
   return {StampOf(path), mayBeRead};
 }
 
-/// Answers about files, kept while size and time of the files stay the same. Any thread may ask; what nobody asked for
-/// longest goes first. An answer lives as long as anybody holds it.
+/// Answers about files, kept while size and time of the files stay the same. Any thread may ask; the least
+/// recently used answer is dropped first. An answer lives as long as anybody holds it.
 template <class Answer>
 class FileCache {
  public:
@@ -51,7 +51,7 @@ class FileCache {
     }
     // Asked before the reading; a file that was written just now may be written again within one tick of its clock.
     const bool mayBeKept = std::ranges::all_of(stamps, IsSettled);
-    // Without the lock: who asks of another file does not wait.
+    // Without the lock: callers that ask about another file do not wait.
     auto answer = std::make_shared<const Answer>(read());
     if (!mayBeKept) return answer;
     const std::lock_guard lock(mutex_);

@@ -239,7 +239,8 @@ Reason Publish(const fs::path& target, std::string_view content, os::File model,
 
 /// Opens an existing file to be read whole, or to be replaced.
 Reason OpenRegular(const std::string& path, os::File& file, os::File::Status& status) {
-  // Asked before, since a mere opening disturbs who waits at a FIFO or a device, and after, since only that is sure.
+  // Asked before, since a mere opening disturbs processes that wait at a FIFO or a device, and after, since only that
+  // is sure.
   std::error_code error;
   const fs::file_status before = fs::status(NativePath(path), error);
   if (fs::exists(before) && !fs::is_regular_file(before)) return WhyNotRegular(fs::is_directory(before));

@@ -243,7 +243,7 @@ std::uint32_t ParentOf(std::uint32_t /*processId*/) { return 0; }
 
 namespace {
 
-/// Signals write into it, so that who waits wakes up.
+/// Signal handlers write into it, so that the waiting thread wakes up.
 std::array<int, 2> g_wake{-1, -1};
 
 void OnSignal(int signal) {

@@ -72,7 +72,7 @@ class ProgramTree {
   const std::optional<ProcessEnd>& End();
   /// How many processes of the tree run, the program among them.
   std::size_t Count();
-  /// Asks all of them to end; who does not listen runs on.
+  /// Asks all of them to end; a process that ignores the request runs on.
   void AskToEnd();
   void Kill();
 

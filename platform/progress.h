@@ -1,8 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// How far a long computation is, and whether it is to stop, between who waits for it and who does it. The two may be
-// in different threads.
+// How far a long computation is, and whether it is to stop, shared by the code that waits for it and the
+// code that does it, which may be in different threads.
 #pragma once
 
 #include <atomic>
@@ -15,7 +15,7 @@ inline constexpr const char* kCancelled = "cancelled";
 /// Thrown inside a computation that is to stop. No public operation lets it out.
 struct Cancelled {};
 
-/// The side of who waits.
+/// The side of the code that waits.
 class Progress {
  public:
   /// From 0 to 1; it never falls.
@@ -37,7 +37,7 @@ class Progress {
   std::atomic<bool> isCancelled_{false};
 };
 
-/// The side of who works: a part of the whole. Without a whole nobody watches.
+/// The side of the code that does the work: a part of the whole. Without a whole, reports go nowhere.
 class ProgressPart {
  public:
   ProgressPart() = default;

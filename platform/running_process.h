@@ -21,7 +21,7 @@ struct RunningProcess {
   static RunningProcess This();
   bool IsOnThisHost() const;
   bool IsThis() const;
-  /// False when it runs no more; of another host nobody knows, and it counts as running.
+  /// False when it runs no more; a process on another host counts as running.
   bool MayRun() const;
 };
 

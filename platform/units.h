@@ -119,7 +119,7 @@ struct ParsedUnit {
 /// when it measures none of our dimensions. UDUNITS takes some 10 ms to load when it is first asked.
 std::optional<ParsedUnit> ParseUnit(std::string_view text);
 
-/// A number in an item type's base unit, or why there is none, in words for who typed it.
+/// A number in an item type's base unit, or why there is none, in words for the user who typed it.
 struct ParsedQuantity {
   double value = 0;
   std::string error;

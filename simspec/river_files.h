@@ -6,7 +6,7 @@
 
 namespace tervane {
 
-/// What the node "River" is asked for by who does not know rivers.
+/// What code that does not know the class of the node "River" asks of it.
 class RiverFiles {
  public:
   virtual ~RiverFiles() = default;

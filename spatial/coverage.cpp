@@ -118,9 +118,9 @@ struct AreaCells {
   std::string problem;
 };
 
-class BoardMaker {
+class CoverageBuilder {
  public:
-  BoardMaker(const CoverageRequest& request, const CoverageBoard* previous, ProgressPart progress)
+  CoverageBuilder(const CoverageRequest& request, const CoverageBoard* previous, ProgressPart progress)
       : previous_(previous), progress_(progress) {
     board_.request = request;
   }
@@ -193,7 +193,7 @@ class BoardMaker {
   std::map<std::pair<std::string, int>, GridSeries> grids_;
 };
 
-void BoardMaker::MakePeriods() {
+void CoverageBuilder::MakePeriods() {
   const std::optional<TimeSpan>& simulation = board_.request.simulation;
   if (!simulation) return;
   const int first = DateAt(simulation->start).Year(), last = DateAt(simulation->end - 1).Year();
@@ -205,7 +205,7 @@ void BoardMaker::MakePeriods() {
   board_.periods.push_back({"simulation", *simulation});
 }
 
-void BoardMaker::MakeDomain() {
+void CoverageBuilder::MakeDomain() {
   if (IsOfSameSetting()) {
     board_.domain = previous_->domain;
     board_.domainProblem = previous_->domainProblem;
@@ -231,7 +231,7 @@ void BoardMaker::MakeDomain() {
 
 // ---- Files
 
-CoverageRow BoardMaker::MakeRow(const CoverageFile& file) {
+CoverageRow CoverageBuilder::MakeRow(const CoverageFile& file) {
   LeaveIfCancelled();
   CoverageRow row;
   if (IsOfSameSetting()) {
@@ -265,7 +265,7 @@ CoverageRow BoardMaker::MakeRow(const CoverageFile& file) {
   return row;
 }
 
-void BoardMaker::ReadData(CoverageRow& row) {
+void CoverageBuilder::ReadData(CoverageRow& row) {
   const FileUse& use = row.file.use;
   const auto facts = DataFileFactsOf(use.path);
   row.problem = facts->error.empty() ? facts->WhyNoItem(use.item) : facts->error;
@@ -289,21 +289,21 @@ void BoardMaker::ReadData(CoverageRow& row) {
   row.gaps = series.gaps;
 }
 
-void BoardMaker::ReadShape(CoverageRow& row) {
+void CoverageBuilder::ReadShape(CoverageRow& row) {
   const auto facts = ShapeFactsOf(row.file.use.path);
   row.problem = facts->error;
   if (!row.problem.empty()) return;
   row.item = row.file.use.attribute;
 }
 
-void BoardMaker::ReadPoints(CoverageRow& row) {
+void CoverageBuilder::ReadPoints(CoverageRow& row) {
   const auto facts = XyzFactsOf(row.file.use.path);
   row.problem = facts->error;
   if (!row.problem.empty()) return;
   row.item = facts->points == 1 ? "1 point" : fmt::format("{} points", facts->points);
 }
 
-void BoardMaker::LookForCells(CoverageRow& row) {
+void CoverageBuilder::LookForCells(CoverageRow& row) {
   if (!row.file.values || !board_.domain || board_.domainCells == 0) return;
   const GridSource& source = *row.file.values;
   const auto facts = source.type == CData2DKvf::kGridFile ? DataFileFactsOf(source.file) : nullptr;
@@ -329,7 +329,7 @@ void BoardMaker::LookForCells(CoverageRow& row) {
   if (row.problem.empty()) TakeMissing(row, isMissing);
 }
 
-void BoardMaker::TakeMissing(CoverageRow& row, const std::vector<bool>& isMissing) {
+void CoverageBuilder::TakeMissing(CoverageRow& row, const std::vector<bool>& isMissing) {
   row.cells = board_.domainCells;
   row.missing = static_cast<std::size_t>(std::ranges::count(isMissing, true));
   if (row.missing == 0) return;
@@ -344,7 +344,7 @@ void BoardMaker::TakeMissing(CoverageRow& row, const std::vector<bool>& isMissin
     row.missingCells = std::move(grid);
 }
 
-void BoardMaker::Conclude(CoverageRow& row) {
+void CoverageBuilder::Conclude(CoverageRow& row) {
   const auto add = [&](Severity severity, std::string text) {
     row.remarks.push_back({severity, std::move(text), {}, {}});
   };
@@ -373,14 +373,14 @@ void BoardMaker::Conclude(CoverageRow& row) {
 
 // ---- Over time
 
-const SeriesFacts& BoardMaker::FactsOfSeries(const std::string& path, int item) {
+const SeriesFacts& CoverageBuilder::FactsOfSeries(const std::string& path, int item) {
   const auto [found, isNew] = series_.try_emplace({path, item});
   if (isNew) found->second = SumSeries(path, item, Spans(), board_.request.simulation, part_);
   LeaveIfCancelled();
   return found->second;
 }
 
-const BoardMaker::GridSeries& BoardMaker::FactsOfGrids(const std::string& path, int number) {
+const CoverageBuilder::GridSeries& CoverageBuilder::FactsOfGrids(const std::string& path, int number) {
   const auto [found, isNew] = grids_.try_emplace({path, number});
   GridSeries& grids = found->second;
   if (!isNew) return grids;
@@ -414,7 +414,7 @@ std::vector<PeriodSum> SumsOfConstant(double value, const std::vector<TimeSpan>&
   return sums;
 }
 
-ForcingTotals BoardMaker::MakeForcing(const CoverageForcing& asked) {
+ForcingTotals CoverageBuilder::MakeForcing(const CoverageForcing& asked) {
   LeaveIfCancelled();
   ForcingTotals totals;
   totals.forcing = asked;
@@ -452,7 +452,7 @@ ForcingTotals BoardMaker::MakeForcing(const CoverageForcing& asked) {
   return totals;
 }
 
-void BoardMaker::AddDomainColumn(ForcingTotals& totals) {
+void CoverageBuilder::AddDomainColumn(ForcingTotals& totals) {
   if (!board_.domain || board_.domainCells == 0) return;
   AreaCells areas = CellsOf(*totals.forcing.forcing.areas);
   if (!areas.problem.empty()) {
@@ -503,7 +503,7 @@ void BoardMaker::AddDomainColumn(ForcingTotals& totals) {
   totals.columns.insert(totals.columns.begin(), std::move(mean));
 }
 
-AreaCells BoardMaker::CellsOf(const GridSource& source) {
+AreaCells CoverageBuilder::CellsOf(const GridSource& source) {
   AreaCells cells;
   GridData grid;
   ZoneTable zones;
@@ -536,7 +536,7 @@ AreaCells BoardMaker::CellsOf(const GridSource& source) {
 FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous, CoverageBoard& board,
                            ProgressPart progress) {
   try {
-    board = BoardMaker(request, previous, progress).Make();
+    board = CoverageBuilder(request, previous, progress).Make();
   } catch (const Cancelled&) {
     return {kCancelled, {}};
   }

@@ -67,15 +67,15 @@ CoverageFile AskFile(const CYbSEKvfBase& node, FileUse use) {
   return file;
 }
 
-/// Asks what takes part below a node that does.
-void AskBelow(const CYbSEKvfBase& node, CoverageRequest& request) {
+/// Adds the files and forcings of all nodes below that take part.
+void AddRequestsBelow(const CYbSEKvfBase& node, CoverageRequest& request) {
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
     if (!child->HoldsSetup() || !child->IsDlgUsedInSetup()) continue;
     if (const auto* user = dynamic_cast<const FileUser*>(child))
       if (std::optional<FileUse> use = user->UsedFile()) request.files.push_back(AskFile(*child, *std::move(use)));
     if (const auto* forcing = dynamic_cast<const ForcingNode*>(child))
       request.forcings.push_back({PathOf(*child), child->Serial(), forcing->CurrentForcing()});
-    AskBelow(*child, request);
+    AddRequestsBelow(*child, request);
   }
 }
 
@@ -85,7 +85,7 @@ CoverageRequest AskCoverage(CYbSEKvfBase& root) {
   CoverageRequest request;
   request.simulation = SimulationOf(root);
   request.domain = DomainOf(root);
-  AskBelow(root, request);
+  AddRequestsBelow(root, request);
   return request;
 }
 

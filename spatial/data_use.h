@@ -1,8 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// What nodes tell of the data that they use, for who looks at the data of a whole setup without knowing any class of
-// node. All are copies of values: another thread may work on them.
+// What nodes report about the data that they use, for code that goes through the data of a whole setup without knowing
+// the classes of nodes. All are copies of values: another thread may work on them.
 #pragma once
 
 #include <memory>

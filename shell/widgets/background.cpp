@@ -26,7 +26,7 @@ QThreadPool& Threads() {
 }  // namespace
 
 struct Background::Run {
-  /// What the thread and those who wait share; the thread holds all that it works on.
+  /// What the thread and the waiting callers share; the thread holds all that it works on.
   struct Shared {
     std::shared_ptr<Computation> computation;
     Progress progress;

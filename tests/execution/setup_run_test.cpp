@@ -176,7 +176,7 @@ TEST_F(Running, AnotherProgramFindsTheRunAndIsToldOfItsEndOnce) {
   EXPECT_THAT(Ended(found), HasSubstr("exit status 5"));
   SetupRun later;
   EXPECT_TRUE(later.Find(first.Files()));
-  found.MarkTold();
+  found.MarkReported();
   EXPECT_FALSE(later.Find(first.Files()));
 }
 

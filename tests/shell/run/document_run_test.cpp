@@ -189,7 +189,7 @@ TEST(DocumentRun, GoesOnWhenTheSetupIsClosedAndIsFoundAgain) {
   EXPECT_TRUE(setup.WaitForEnd());
   EXPECT_TRUE(setup.Shows("exit status 4"));
   // Once.
-  ASSERT_TRUE(QTest::qWaitFor([&] { return ReadRunState(state, problem)->isTold; }));
+  ASSERT_TRUE(QTest::qWaitFor([&] { return ReadRunState(state, problem)->isReported; }));
   ASSERT_TRUE(setup.Window().CloseDocument(&setup.Frame()));
   ASSERT_TRUE(setup.Window().OpenDocument(ToQt(setup.Path())));
   EXPECT_FALSE(setup.Run().IsExecuting());
