@@ -30,7 +30,7 @@ class EditedLibrary : public testing::Test {
 };
 
 TEST_F(EditedLibrary, PageShowsTheChosenEntry) {
-  EXPECT_THAT(FormText(page_->Form()), HasSubstr("\"Name:\" Maize"));
+  EXPECT_THAT(FormText(page_->Form()), HasSubstr("\"Name:\" = Maize"));
   EXPECT_THAT(FormText(page_->Form()), HasSubstr("\"Day\" | \"LAI\" | \"RD [m]\" | \"Kc\"\n"
                                                  "  100 | 4 | 1 | 1.2\n"
                                                  "  0 | 0.1 | 0.2 | \n"));
@@ -40,7 +40,7 @@ TEST_F(EditedLibrary, PageShowsTheChosenEntry) {
   EXPECT_THAT(page_->Node().Findings()[0].text, HasSubstr("Stage 2: Kc is missing"));
   EXPECT_THAT(page_->Node().Findings()[1].text, HasSubstr("Stage 2: Day 0 stands behind 100"));
   editor_.Choose(1);
-  EXPECT_THAT(FormText(page_->Form()), HasSubstr("\"Name:\" Grass"));
+  EXPECT_THAT(FormText(page_->Form()), HasSubstr("\"Name:\" = Grass"));
   EXPECT_THAT(page_->Node().Findings()[0].text, HasSubstr("Maize: Stage 2"));
   EXPECT_FALSE(editor_.IsModified());
 }
