@@ -32,6 +32,7 @@
 #include "simspec/basic_parameters.h"
 #include "simspec/extra_params.h"
 #include "simspec/titles.h"
+#include "spatial/zones.h"
 
 namespace tervane::bench {
 
