@@ -64,7 +64,8 @@ class TerminalShell : public EngineShell {
 void TerminalShell::Start(const CYbSimpleLaunch& launch, bool /*showsProgress*/) {
   std::string problem;
   SetupRun run;
-  const std::optional<RunRequest> request = RequestOf(launch, document_.getResultFolder(), options_.engines, problem);
+  const EnginePlaces places = options_.engines.empty() ? EnginePlaces::Here({}) : EnginePlaces::Only(options_.engines);
+  const std::optional<RunRequest> request = RequestOf(launch, document_.getResultFolder(), places, problem);
   os::KeepEndRequests();
   if (!request || !run.Start(*request, problem)) {
     Tell(run, problem);

@@ -106,6 +106,10 @@ std::string FindEngine(std::string_view name, const EnginePlaces& places, std::s
     problem = fmt::format("{} may not be started: make it executable (chmod +x)", notStartable);
     return {};
   }
+  if (places.IsOnly()) {
+    problem = fmt::format("the engine {} was not found in {}: name the folder that has it", stem, places.setting);
+    return {};
+  }
   const auto told = [](const std::string& value) { return value.empty() ? "not set" : value; };
   problem = fmt::format(
       "the engine {} was not found. Looked for in the setting {} ({}), in {} of the environment ({}), and in {}. Put "

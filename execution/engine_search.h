@@ -17,7 +17,12 @@ struct EnginePlaces {
   std::string environment;  ///< The value of the variable.
   std::string beside;       ///< The folder `engines` beside the program.
 
+  /// The places of this program and environment.
   static EnginePlaces Here(const std::string& setting);
+  /// Folders that were named for one run, separated as in PATH: an engine that is not there is not looked for
+  /// elsewhere.
+  static EnginePlaces Only(const std::string& folders) { return {folders, {}, {}}; }
+  bool IsOnly() const { return environment.empty() && beside.empty(); }
 };
 
 /// The path of an engine by its file name, which may stand with or without ".exe" in the call and on disk. Empty with

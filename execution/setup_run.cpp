@@ -41,8 +41,8 @@ bool MayRun(const std::optional<RunningProcess>& process) { return process && pr
 }  // namespace
 
 std::optional<RunRequest> RequestOf(const CYbSimpleLaunch& launch, const std::string& resultFolder,
-                                    const std::string& enginePath, std::string& problem) {
-  const std::string engine = FindEngine(launch.Engine, EnginePlaces::Here(enginePath), problem);
+                                    const EnginePlaces& places, std::string& problem) {
+  const std::string engine = FindEngine(launch.Engine, places, problem);
   if (engine.empty()) return std::nullopt;
   return RunRequest{launch.Input, resultFolder, engine, launch.Options, launch.ExtraLog, launch.Report};
 }

@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "core/engine_shell.h"
+#include "execution/engine_search.h"
 #include "execution/run_state.h"
 
 namespace tervane {
@@ -25,9 +26,8 @@ struct RunRequest {
 };
 
 /// The request that a document's start comes to; nothing, with the problem, when the engine is not there.
-/// `enginePath` is the setting of that name.
 std::optional<RunRequest> RequestOf(const CYbSimpleLaunch& launch, const std::string& resultFolder,
-                                    const std::string& enginePath, std::string& problem);
+                                    const EnginePlaces& places, std::string& problem);
 
 /// A run that this or another program started. Each `Look` reads the files anew; nothing waits.
 class SetupRun {

@@ -49,8 +49,8 @@ bool DocumentRun::IsShiftHeld() const { return QGuiApplication::keyboardModifier
 void DocumentRun::Start(const CYbSimpleLaunch& launch, bool showsProgress) {
   std::string problem;
   SetupRun run;
-  const std::optional<RunRequest> request =
-      RequestOf(launch, session_.Document().getResultFolder(), host_.Setting(kEnginePathSetting), problem);
+  const std::optional<RunRequest> request = RequestOf(launch, session_.Document().getResultFolder(),
+                                                      EnginePlaces::Here(host_.Setting(kEnginePathSetting)), problem);
   if (!request || !run.Start(*request, problem)) {
     AddToLog(tr("Not run: %1").arg(ToQt(problem)));
     host_.Tell(problem, Host::Icon::Error);

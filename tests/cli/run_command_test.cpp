@@ -65,7 +65,7 @@ TEST_F(RunCommand, TellsTheSameAsJson) {
 
 TEST_F(RunCommand, ARunThatDidNotBeginCouldNotBeDone) {
   EXPECT_EQ(RunCommandLine({"run", file, "--engines", folder.File("none"), "--json"}, out, err), kCouldNot);
-  EXPECT_THAT(err.str(), HasSubstr("the engine Tvn_Simulation was not found"));
+  EXPECT_THAT(err.str(), HasSubstr("the engine Tvn_Simulation was not found in " + folder.File("none")));
   EXPECT_STREQ(Json()["outcome"].GetString(), "not started");
   EXPECT_EQ(RunCommandLine({"run", folder.File("none.tvd")}, out, err), kCouldNot);
   EXPECT_EQ(Tervane("true", {"--pp", "--wm"}), kCouldNot);

@@ -33,6 +33,9 @@ TEST(EngineSearch, TellsWhereItHasLookedAndWhatMayNotBeStarted) {
   EXPECT_THAT(problem,
               AllOf(HasSubstr("the engine Engine was not found"), HasSubstr(folder.File("a")),
                     HasSubstr("TERVANE_ENGINES of the environment (not set)"), HasSubstr("/programs/engines")));
+  // Folders that were named for one run are the only ones.
+  EXPECT_EQ(FindEngine("Missing", EnginePlaces::Only(folder.File("a")), problem), "");
+  EXPECT_EQ(problem, "the engine Missing was not found in " + folder.File("a") + ": name the folder that has it");
   folder.Write("a/Engine", "#!/bin/sh\n");
   EXPECT_EQ(FindEngine("Engine.exe", places, problem), "");
   EXPECT_THAT(problem, AllOf(HasSubstr(folder.File("a/Engine")), HasSubstr("chmod +x")));
