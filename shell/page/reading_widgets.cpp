@@ -4,6 +4,7 @@
 #include <QClipboard>
 #include <QDesktopServices>
 #include <QHBoxLayout>
+#include <QLineEdit>
 #include <QMimeData>
 #include <QPlainTextEdit>
 #include <QPushButton>
@@ -26,6 +27,8 @@ class ShownWidget : public ControlWidget {
     if (!control.beside) MakeLabel();
     value_ = new QLabel;
     value_->setTextInteractionFlags(Qt::TextSelectableByMouse);
+    // As high as a field, so that it is on the line of its label.
+    if (!control.beside) value_->setMinimumHeight(QLineEdit().sizeHint().height());
     MakeField(value_, control.unit.empty() && control.itemType == 0);
   }
 
