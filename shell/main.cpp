@@ -83,6 +83,7 @@ int Run(const Typed& typed, QApplication& application) {
   theme.SetZoom(typed.zoom > 0 ? typed.zoom : program.Settings().value("Zoom", 1.0).toDouble());
 
   MainWindow window(program);
+  if (isPicture) window.SetUnattended();
   if (!typed.size.empty()) window.resize(ParseSize(typed.size));
   window.show();
   for (const std::string& file : typed.files)

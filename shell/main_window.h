@@ -46,6 +46,8 @@ class MainWindow : public QMainWindow {
   bool ShowDataFile(const QString& path);
   /// Opens a library of named entries in a tab of its own, or shows the one in which it is open.
   bool OpenLibrary(const LibraryKind& kind, const QString& path);
+  /// Nobody is there to answer; see QtHost.
+  void SetUnattended() { host_.SetUnattended(); }
   /// One of these, by the file's name.
   bool OpenFile(const QString& path);
   /// Offers what a crash left of setups that nobody opens by name.

@@ -9,6 +9,7 @@
 #include <QProgressDialog>
 #include <QTimer>
 #include <QUrl>
+#include <cstdio>
 
 #include "shell/item_dialog.h"
 #include "shell/library_dialog.h"
@@ -35,6 +36,11 @@ QString DialogFilter(const std::string& filter) {
 }
 
 Host::Answer QtHost::Ask(const std::string& text, Icon icon, Buttons buttons) {
+  if (isUnattended_) {
+    std::fprintf(stderr, "quarzel: %s\n", text.c_str());
+    if (buttons == Buttons::Ok) return Answer::Ok;
+    return buttons == Buttons::YesNo ? Answer::No : Answer::Cancel;
+  }
   QMessageBox box(window_);
   box.setText(Translated(text));
   switch (icon) {
@@ -78,6 +84,7 @@ Host::Answer QtHost::Ask(const std::string& text, Icon icon, Buttons buttons) {
 }
 
 std::optional<std::string> QtHost::AskFileToOpen(const FileQuestion& question) {
+  if (isUnattended_) return std::nullopt;
   const QString title = question.title.empty() ? QFileDialog::tr("Open") : Translated(question.title);
   const QString path =
       QFileDialog::getOpenFileName(window_, title, ToQt(question.current), DialogFilter(question.filter));
@@ -85,6 +92,7 @@ std::optional<std::string> QtHost::AskFileToOpen(const FileQuestion& question) {
 }
 
 std::optional<std::string> QtHost::AskFileToSave(const FileQuestion& question) {
+  if (isUnattended_) return std::nullopt;
   QFileDialog dialog(window_, question.title.empty() ? QFileDialog::tr("Save As") : Translated(question.title));
   dialog.setAcceptMode(QFileDialog::AcceptSave);
   dialog.setNameFilter(DialogFilter(question.filter));
@@ -95,11 +103,13 @@ std::optional<std::string> QtHost::AskFileToSave(const FileQuestion& question) {
 }
 
 std::optional<int> QtHost::AskItem(const ItemQuestion& question) {
+  if (isUnattended_) return std::nullopt;
   ItemDialog dialog(question, window_);
   return dialog.exec() == QDialog::Accepted ? std::optional(dialog.Chosen()) : std::nullopt;
 }
 
 std::optional<Host::LibraryChoice> QtHost::SelectLibraryEntry(const LibraryQuestion& question) {
+  if (isUnattended_) return std::nullopt;
   LibraryDialog dialog(question, *this, window_);
   return dialog.exec() == QDialog::Accepted ? std::optional(dialog.Chosen()) : std::nullopt;
 }

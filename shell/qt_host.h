@@ -15,6 +15,10 @@ class QtHost : public Host {
  public:
   QtHost(QWidget* window, QSettings& settings) : window_(window), settings_(settings) {}
 
+  /// Nobody is there to answer, as while a picture is made: what would be shown is printed, and what would be asked is
+  /// declined.
+  void SetUnattended() { isUnattended_ = true; }
+
   Answer Ask(const std::string& text, Icon icon, Buttons buttons) override;
   std::optional<std::string> AskFileToOpen(const FileQuestion& question) override;
   std::optional<std::string> AskFileToSave(const FileQuestion& question) override;
@@ -28,6 +32,7 @@ class QtHost : public Host {
  private:
   QPointer<QWidget> window_;
   QSettings& settings_;
+  bool isUnattended_ = false;
 };
 
 /// A filter of texts and patterns in turn, "Grid file (*.nds2)|*.nds2||", as the toolkit's dialogs want it.

@@ -49,6 +49,14 @@ TEST(MainWindow, RefreshMarksTheDocumentModified) {
   EXPECT_FALSE(setup.Session().Steps().CanUndo());
 }
 
+TEST(MainWindow, WithoutAUserAMessageIsPrintedAndNothingWaits) {
+  OpenedSetup setup;
+  setup.Window().SetUnattended();
+  const NextAnswer box("OK");
+  EXPECT_FALSE(setup.Window().OpenFile("/missing/karup.tvd"));
+  EXPECT_EQ(box.Text(), "");
+}
+
 TEST(MainWindow, MarksInTheTreeAreShownAsTheSetupSays) {
   OpenedSetup setup("section ViewSettings {\nShowValidationIcons = 0\n}");
   EXPECT_FALSE(setup.Action("Show Validation Icons")->isChecked());
