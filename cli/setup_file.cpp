@@ -99,14 +99,16 @@ WrittenSetup::WrittenSetup(const CFlowModelDoc& document)
 KvfSection* WrittenSetup::SectionOf(const CYbSEKvfBase& node) const {
   const CYbSEKvfBase* parent = node.GetParent();
   if (!parent) return target_;
-  KvfSection* section = SectionOf(*parent);
-  if (!section || node.GetSectionName().empty()) return section;
+  if (const auto known = sections_.find(&node); known != sections_.end()) return known->second;
+  KvfSection* const section = SectionOf(*parent);
   // Like sections are told apart by their place among each other.
-  const std::string name = node.FormattedSectionName();
-  std::size_t instance = 1;
-  for (CYbSEKvfBase* sibling = parent->GetFirstChild(); sibling != &node; sibling = parent->GetNextChild(sibling))
-    instance += sibling->FormattedSectionName() == name;
-  return AsSection(FindKvfNode(*section, false, name, instance));
+  std::unordered_map<std::string, std::size_t> instances;
+  for (CYbSEKvfBase* child = parent->GetFirstChild(); child; child = parent->GetNextChild(child)) {
+    const std::string name = child->FormattedSectionName();
+    const bool isInParents = !section || child->GetSectionName().empty();
+    sections_[child] = isInParents ? section : AsSection(FindKvfNode(*section, false, name, ++instances[name]));
+  }
+  return sections_[&node];
 }
 
 KvfNode* FindKeyOrReport(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams) {

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <string>
+#include <unordered_map>
 
 #include "cli/commands.h"
 #include "document/flow_model_document.h"
@@ -45,6 +46,8 @@ class WrittenSetup {
  private:
   KvfFile* file_;
   KvfSection* target_;
+  /// Of all children of the nodes that were asked for, so that asking for each of many siblings looks at each once.
+  mutable std::unordered_map<const CYbSEKvfBase*, KvfSection*> sections_;
 };
 
 /// The key that a path names in its section; null, with a message, when it is not there.

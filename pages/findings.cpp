@@ -4,6 +4,8 @@
 
 #include <unordered_map>
 
+#include "core/walked_node.h"
+
 namespace tervane {
 
 namespace {
@@ -30,13 +32,14 @@ SetupFinding::Kind KindOf(Severity severity) {
 }
 
 /// The findings of all nodes below, in the order of the walk. A path is made for a node that has some alone.
-void AddFindings(const CYbSEKvfBase& node, std::vector<SetupFinding>& found) {
+void AddFindings(const CYbSEKvfBase& node, WalkedNode& place, std::vector<SetupFinding>& found) {
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
     if (!child->HoldsSetup()) continue;
-    const std::string path = child->Findings().empty() ? std::string() : PathOf(*child);
+    WalkedNode childPlace(place, *child);
     for (const Finding& finding : child->Findings())
-      found.push_back({KindOf(finding.severity), path, finding.text, finding.key, finding.detail, 0, child->Serial()});
-    AddFindings(*child, found);
+      found.push_back(
+          {KindOf(finding.severity), childPlace.Path(), finding.text, finding.key, finding.detail, 0, child->Serial()});
+    AddFindings(*child, childPlace, found);
   }
 }
 
@@ -63,7 +66,8 @@ std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document) {
   if (!report.IsEmpty())
     WalkNodes(document.Root(), [&](const NodePlace& place) { serials.emplace(place.path, place.node.Serial()); });
   std::vector<SetupFinding> ofNodes;
-  AddFindings(document.Root(), ofNodes);
+  WalkedNode root(document.Root());
+  AddFindings(document.Root(), root, ofNodes);
   std::vector<SetupFinding> found;
   for (const LoadReport::Entry& entry : report.entries)
     found.push_back({entry.kind == LoadReport::Kind::Warning ? Kind::Warning : Kind::Note,

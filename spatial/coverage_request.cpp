@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <fmt/format.h>
 
+#include "core/walked_node.h"
 #include "geometry/shapes.h"
 #include "simspec/periods.h"
 #include "spatial/coverage.h"
@@ -46,9 +47,9 @@ std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
   return TimeSpan{start.SecondsSinceEpoch(), end.SecondsSinceEpoch()};
 }
 
-CoverageFile AskFile(const CYbSEKvfBase& node, FileUse use) {
+CoverageFile AskFile(const CYbSEKvfBase& node, const std::string& path, FileUse use) {
   CoverageFile file;
-  file.path = PathOf(node);
+  file.path = path;
   file.serial = node.Serial();
   file.title = TitleOf(node);
   file.findings = node.Findings();
@@ -68,14 +69,16 @@ CoverageFile AskFile(const CYbSEKvfBase& node, FileUse use) {
 }
 
 /// Adds the files and forcings of all nodes below that take part.
-void AddRequestsBelow(const CYbSEKvfBase& node, CoverageRequest& request) {
+void AddRequestsBelow(const CYbSEKvfBase& node, WalkedNode& place, CoverageRequest& request) {
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
     if (!child->HoldsSetup() || !child->IsDlgUsedInSetup()) continue;
+    WalkedNode childPlace(place, *child);
     if (const auto* user = dynamic_cast<const FileUser*>(child))
-      if (std::optional<FileUse> use = user->UsedFile()) request.files.push_back(AskFile(*child, *std::move(use)));
+      if (std::optional<FileUse> use = user->UsedFile())
+        request.files.push_back(AskFile(*child, childPlace.Path(), *std::move(use)));
     if (const auto* forcing = dynamic_cast<const ForcingNode*>(child))
-      request.forcings.push_back({PathOf(*child), child->Serial(), forcing->CurrentForcing()});
-    AddRequestsBelow(*child, request);
+      request.forcings.push_back({childPlace.Path(), child->Serial(), forcing->CurrentForcing()});
+    AddRequestsBelow(*child, childPlace, request);
   }
 }
 
@@ -85,7 +88,8 @@ CoverageRequest AskCoverage(CYbSEKvfBase& root) {
   CoverageRequest request;
   request.simulation = SimulationOf(root);
   request.domain = DomainOf(root);
-  AddRequestsBelow(root, request);
+  WalkedNode place(root);
+  AddRequestsBelow(root, place, request);
   return request;
 }
 

@@ -5,6 +5,7 @@
 #include <gmock/gmock.h>
 
 #include "core/list.h"
+#include "core/walked_node.h"
 #include "tests/core/node_tree.h"
 
 namespace tervane {
@@ -302,6 +303,16 @@ TEST(Node, APathLeadsToANode) {
     if (place.takesPart) taking.push_back(std::to_string(place.depth) + place.node.FormattedSectionName());
   });
   EXPECT_THAT(taking, ElementsAre("1", "2Deep", "1List", "2Item_1", "2Item_2"));
+
+  // Also where siblings in front were not asked for.
+  WalkedNode top(root);
+  for (CYbSEKvfBase* child = root.GetFirstChild(); child; child = root.GetNextChild(child)) {
+    WalkedNode place(top, *child);
+    for (CYbSEKvfBase* below = child->GetFirstChild(); below; below = child->GetNextChild(below)) {
+      if (below == first) continue;
+      EXPECT_EQ(WalkedNode(place, *below).Path(), PathOf(*below));
+    }
+  }
 }
 
 }  // namespace
