@@ -169,11 +169,7 @@ struct DataFile::State {
   std::optional<RasterFile> raster;  ///< Where the file is no netCDF.
   DataFileHeader header;
 
-  ~State() {
-    if (!file.IsOpen()) return;
-    const netcdf::Lock lock;
-    file = netcdf::Handle();
-  }
+  ~State() { netcdf::CloseLocked(file); }
 
   /// Reads one step (and layer) that stands in the order of the buffer.
   std::string ReadInOrder(const ItemStorage& storage, std::vector<std::size_t> start, std::vector<std::size_t> count,

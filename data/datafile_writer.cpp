@@ -151,10 +151,7 @@ struct DataFileWriter::State {
   bool isFirstBoundOpen = false;
   std::string failure;  ///< The first one; nothing is written behind it.
 
-  ~State() {
-    const netcdf::Lock lock;
-    file = netcdf::Handle();
-  }
+  ~State() { netcdf::CloseLocked(file); }
 
   std::string Fail(const std::string& reason) {
     failure = fmt::format("cannot write {}: {}; nothing was written", path, reason);

@@ -63,6 +63,12 @@ std::string InWords(int status) {
   }
 }
 
+void CloseLocked(Handle& file) {
+  if (!file.IsOpen()) return;
+  const Lock lock;
+  file = Handle();
+}
+
 std::string TextAttribute(int file, int variable, const char* name) {
   constexpr std::size_t kLongest = 1u << 20;
   nc_type type = NC_NAT;

@@ -58,6 +58,9 @@ class Handle {
   int id_ = -1;
 };
 
+/// Closes a file under the lock. Where none is open the library is not even loaded.
+void CloseLocked(Handle& file);
+
 /// A text attribute, of characters or of one string; "" when it is missing, of another type or longer than 1 MB.
 std::string TextAttribute(int file, int variable, const char* name);
 /// The numbers of an attribute; none when it is missing, a text or longer than 1000 numbers.

@@ -5,11 +5,12 @@
 // for: both would take some milliseconds of every start.
 #pragma once
 
-#include <cstddef>
 #include <string>
 
 #include <hdf5.h>
 #include <netcdf.h>
+
+#include "platform/program_module.h"
 
 namespace tervane::netcdf {
 
@@ -52,9 +53,7 @@ namespace tervane::netcdf {
 
 /// A pointer for each function, under the function's name.
 struct Calls {
-#define TERVANE_POINTER(name) decltype(&::name) name;
-  TERVANE_NETCDF_CALLS(TERVANE_POINTER)
-#undef TERVANE_POINTER
+  TERVANE_NETCDF_CALLS(TERVANE_CALL_POINTER)
 };
 
 inline constexpr const char* kModuleName = "tervane_netcdf";

@@ -14,7 +14,6 @@
 #include "data/raster/raster_module.h"
 #include "geometry/cart.h"
 #include "platform/item_types.h"
-#include "platform/os.h"
 #include "platform/paths.h"
 #include "platform/program_module.h"
 #include "platform/text.h"

@@ -4,10 +4,11 @@
 // The functions of PROJ that we call. A module has them, which is loaded when a projection is first asked for.
 #pragma once
 
-#include <cstddef>
 #include <string>
 
 #include <proj.h>
+
+#include "platform/program_module.h"
 
 namespace tervane::projections {
 
@@ -40,9 +41,7 @@ namespace tervane::projections {
 
 /// A pointer for each function, under the function's name.
 struct Calls {
-#define TERVANE_POINTER(name) decltype(&::name) name;
-  TERVANE_PROJ_CALLS(TERVANE_POINTER)
-#undef TERVANE_POINTER
+  TERVANE_PROJ_CALLS(TERVANE_CALL_POINTER)
 };
 
 inline constexpr const char* kModuleName = "tervane_proj";

@@ -22,7 +22,10 @@ ProgramModule LoadProgramModule(std::string_view name, const char* entryName, st
 /// What is said of a module that is there and refuses to serve.
 std::string OtherVersionOf(std::string_view name);
 
-/// The functions of a library, as a struct of pointers that a module fills.
+/// A member of the struct of a library's functions, for a list of their names.
+#define TERVANE_CALL_POINTER(name) decltype(&::name) name;
+
+/// The functions of a library, as a struct of pointers that a module fills (platform/module_export.h).
 template <class Calls>
 struct LateCalls {
   const Calls* calls = nullptr;

@@ -177,7 +177,7 @@ bool LibraryTab::Save(const std::string& path) {
 }
 
 void LibraryTab::CheckDisk() {
-  // What the user has changed is his until he saves, who is then asked.
+  // Unsaved changes stay; the user is asked when they are saved.
   if (!editor_.IsOtherOnDisk() || editor_.IsModified()) return;
   if (editor_.Reload().empty()) Sync();
 }

@@ -17,11 +17,7 @@
 #include <gdal.h>
 #include <ogr_spatialref.h>
 
-#if defined(_WIN32)
-#define TERVANE_EXPORT __declspec(dllexport)
-#else
-#define TERVANE_EXPORT __attribute__((visibility("default")))
-#endif
+#include "platform/module_export.h"
 
 namespace tervane::raster {
 

@@ -31,7 +31,7 @@ Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& 
           },
           [&filler, &owner] {
             std::vector<std::string> options = ZoneItemTitles(owner);
-            // A name that nobody bears stands behind the others until another one is chosen.
+            // A name that no zone has is listed last until another one is chosen.
             if (std::ranges::find(options, filler) == options.end())
               options.push_back(filler.empty() ? filler : filler + " (not in the list)");
             return options;
@@ -39,7 +39,7 @@ Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& 
       .Key("ShapeGapFillName");
 }
 
-/// Where nobody bears that name, the first fills them.
+/// Sets `filler` to the first zone when none has that name.
 void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner) {
   const std::vector<std::string> names = ZoneItemTitles(owner);
   if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
