@@ -45,7 +45,7 @@ int Check(int status) {
   return status;
 }
 
-void Tell(const std::string& error) {
+void StopAt(const std::string& error) {
   if (!error.empty()) fmt::print("WRONG: {}\n", error);
 }
 
@@ -55,12 +55,12 @@ int WriteOurs(const std::string& path, const std::vector<float>& values, std::si
   content.geometry.cellSize = 50;
   content.items = {{"Elevation", quantity::kElevation, 1000, {}}};
   DataFileWriter writer;
-  Tell(writer.Create(path, content));
+  StopAt(writer.Create(path, content));
   for (std::size_t step = 0; step < steps; ++step) {
-    Tell(writer.AddStep(CYbDateTime(2000, 1, 1) + CYbDateTimeSpan::Days(static_cast<double>(step))));
-    Tell(writer.Put(1, values));
+    StopAt(writer.AddStep(CYbDateTime(2000, 1, 1) + CYbDateTimeSpan::Days(static_cast<double>(step))));
+    StopAt(writer.Put(1, values));
   }
-  Tell(writer.Finish().error);
+  StopAt(writer.Finish().error);
   return 0;
 }
 
@@ -89,8 +89,8 @@ int WriteBare(const std::string& path, const std::vector<float>& values) {
 
 float ReadOurs(const std::string& path, std::vector<float>& buffer) {
   DataFile file;
-  Tell(file.Open(path));
-  for (std::size_t step = 0; step < file.Time().steps; ++step) Tell(file.Read({1, step, 1, {}}, buffer));
+  StopAt(file.Open(path));
+  for (std::size_t step = 0; step < file.Time().steps; ++step) StopAt(file.Read({1, step, 1, {}}, buffer));
   return buffer[1];
 }
 
@@ -110,7 +110,7 @@ float ReadBare(const std::string& path, std::vector<float>& buffer) {
 double TimeOfHeader(const std::string& path) {
   const auto start = std::chrono::steady_clock::now();
   DataFile file;
-  Tell(file.Open(path));
+  StopAt(file.Open(path));
   const std::chrono::duration<double, std::milli> time = std::chrono::steady_clock::now() - start;
   return time.count();
 }

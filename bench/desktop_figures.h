@@ -35,11 +35,11 @@ inline double MedianOf(const std::function<void()>& measured) {
   return Median(times);
 }
 
-inline void Tell(const std::string& what, double figure, double limit, const char* unit) {
+inline void Report(const std::string& what, double figure, double limit, const char* unit) {
   fmt::print("{:<64} {:>8.1f} {:<2}  limit {:>4.0f}  {}\n", what, figure, unit, limit, Verdict(figure, limit));
 }
 
-inline void TellPeer(const std::string& what, double figure, const char* unit) {
+inline void ReportPeer(const std::string& what, double figure, const char* unit) {
   fmt::print("{:<64} {:>8.1f} {}\n", what, figure, unit);
 }
 

@@ -73,8 +73,8 @@ void MeasureMap(const std::string& what, double rotation, bool isCodes) {
                            view.Canvas().WaitUntilReady();
                            view.Canvas().grab();
                          });
-  Tell(what + ": until the window answers", answer, 30, "ms");
-  Tell(what + ": until the first picture", picture, 1000, "ms");
+  Report(what + ": until the window answers", answer, 30, "ms");
+  Report(what + ": until the first picture", picture, 1000, "ms");
   for (const double zoom : {1.0, 8.0}) {
     view.Canvas().Fit();
     view.Canvas().Zoom(zoom);
@@ -84,8 +84,8 @@ void MeasureMap(const std::string& what, double rotation, bool isCodes) {
         view.Canvas().repaint();
       }
     });
-    Tell(fmt::format("{}, zoom {}: a frame of panning ({:.0f} a second)", what, zoom, 1000 * kFrames / frames),
-         frames / kFrames, 1000.0 / 30, "ms");
+    Report(fmt::format("{}, zoom {}: a frame of panning ({:.0f} a second)", what, zoom, 1000 * kFrames / frames),
+           frames / kFrames, 1000.0 / 30, "ms");
   }
 }
 
@@ -123,19 +123,22 @@ void MeasureNetwork() {
     view.Canvas().Zoom(zoom);
     view.Canvas().repaint();
     // Zooming by a little draws all lines anew.
-    Tell(fmt::format("a network of 100,000 points over it, zoom {}: drawn", zoom), MedianOf([&] {
-           view.Canvas().Zoom(1.0001);
-           view.Canvas().repaint();
-         }),
-         50, "ms");
+    Report(fmt::format("a network of 100,000 points over it, zoom {}: drawn", zoom), MedianOf([&] {
+             view.Canvas().Zoom(1.0001);
+             view.Canvas().repaint();
+           }),
+           50, "ms");
     std::vector<double> frames;
     for (int i = 0; i < kFrames; ++i)
       frames.push_back(Milliseconds([&] {
         view.Canvas().Pan({i % 2 == 0 ? 7.0 : -5.0, 3.0});
         view.Canvas().repaint();
       }));
-    Tell("  the same: a frame of panning", Median(frames), 1000.0 / 60, "ms");
-    Tell("  the same: what is under the pointer", MedianOf([&] { view.Canvas().TextAt({460000, 5060000}); }), 5, "ms");
+    Report("  the same: a frame of panning", Median(frames), 1000.0 / 60, "ms");
+    Report("  the same: what is under the pointer", MedianOf([&] {
+             view.Canvas().TextAt({460000, 5060000});
+           }),
+           5, "ms");
   }
 }
 
@@ -143,13 +146,13 @@ void MeasurePeer() {
   QImage image(kSide, kSide, QImage::Format_RGB32);
   image.fill(Qt::darkCyan);
   QImage target(kSize, QImage::Format_RGB32);
-  TellPeer("  peer: the toolkit draws a picture of as many pixels, turned", MedianOf([&] {
-             QPainter painter(&target);
-             painter.rotate(20);
-             painter.scale(0.15, 0.15);
-             painter.drawImage(0, 0, image);
-           }),
-           "ms");
+  ReportPeer("  peer: the toolkit draws a picture of as many pixels, turned", MedianOf([&] {
+               QPainter painter(&target);
+               painter.rotate(20);
+               painter.scale(0.15, 0.15);
+               painter.drawImage(0, 0, image);
+             }),
+             "ms");
 }
 
 /// Calls `passed` with each time that passes between two events of the window, in milliseconds, until `isOver`.
@@ -193,8 +196,8 @@ void MeasureInterpolation() {
   const double whole = Milliseconds([&] {
     WatchEvents([&] { return !view.IsBusy(); }, [&](double passed) { longest = std::max(longest, passed); });
   });
-  TellPeer("interpolate 25 million cells of 20,000 points, until the picture", whole, "ms");
-  Tell("  the longest time without an event of the window meanwhile", longest, 50, "ms");
+  ReportPeer("interpolate 25 million cells of 20,000 points, until the picture", whole, "ms");
+  Report("  the longest time without an event of the window meanwhile", longest, 50, "ms");
 
   computed = computation();
   view.ShowWhenThere(content, nullptr);
@@ -207,7 +210,7 @@ void MeasureInterpolation() {
   // Whoever runs it next waits for the thread that works on it.
   Progress cancelled;
   cancelled.Cancel();
-  Tell("  from cancelling to the end of the work", Milliseconds([&] { computed->Run(cancelled); }), 50, "ms");
+  Report("  from cancelling to the end of the work", Milliseconds([&] { computed->Run(cancelled); }), 50, "ms");
 }
 
 void MeasureViewer() {
@@ -242,14 +245,14 @@ void MeasureViewer() {
     WatchEvents([&] { return !viewer->findChild<MapView*>()->IsBusy(); }, [](double) {});
     viewer->grab();
   };
-  Tell("a data file of 400 MB: until its tab answers", answer, 200, "ms");
-  Tell("  until its map", answer + Milliseconds(wait), 500, "ms");
+  Report("a data file of 400 MB: until its tab answers", answer, 200, "ms");
+  Report("  until its map", answer + Milliseconds(wait), 500, "ms");
   auto* steps = viewer->findChild<QSlider*>();
-  Tell("  another time step, until its map", MedianOf([&] {
-         steps->setValue(steps->value() + 1);
-         wait();
-       }),
-       100, "ms");
+  Report("  another time step, until its map", MedianOf([&] {
+           steps->setValue(steps->value() + 1);
+           wait();
+         }),
+         100, "ms");
 }
 
 void MeasureSeries() {
@@ -269,17 +272,17 @@ void MeasureSeries() {
   plot.resize(kSize);
   plot.show();
   QApplication::processEvents();
-  Tell("2 series of 100,000 values: until the first picture", Milliseconds([&] {
-         plot.Show(content);
-         plot.Chart().replot();
-       }),
-       200, "ms");
-  Tell("the same: zoom and draw", MedianOf([&] {
-         plot.Zoom(1.1);
-         plot.Chart().replot();
-       }),
-       50, "ms");
-  Tell("the same: see that nothing changed", MedianOf([&] { plot.Show(content); }), 16, "ms");
+  Report("2 series of 100,000 values: until the first picture", Milliseconds([&] {
+           plot.Show(content);
+           plot.Chart().replot();
+         }),
+         200, "ms");
+  Report("the same: zoom and draw", MedianOf([&] {
+           plot.Zoom(1.1);
+           plot.Chart().replot();
+         }),
+         50, "ms");
+  Report("the same: see that nothing changed", MedianOf([&] { plot.Show(content); }), 16, "ms");
 }
 
 void Measure() {

@@ -109,11 +109,11 @@ class Probe : public QObject {
   std::thread thread_;
 };
 
-void TellDelays(const std::string& while_, std::vector<double> delays) {
+void ReportDelays(const std::string& while_, std::vector<double> delays) {
   std::ranges::sort(delays);
-  TellPeer(fmt::format("99.9 % of {} events wait, {}", delays.size(), while_), delays[delays.size() * 999 / 1000],
-           "ms");
-  Tell("the longest wait, " + while_, delays.back(), 50, "ms");
+  ReportPeer(fmt::format("99.9 % of {} events wait, {}", delays.size(), while_), delays[delays.size() * 999 / 1000],
+             "ms");
+  Report("the longest wait, " + while_, delays.back(), 50, "ms");
 }
 
 void MeasureIdle(int seconds) {
@@ -121,7 +121,7 @@ void MeasureIdle(int seconds) {
   QElapsedTimer timer;
   timer.start();
   while (timer.elapsed() < seconds * 1000) QApplication::processEvents(QEventLoop::WaitForMoreEvents);
-  TellDelays("nothing runs", probe.delays);
+  ReportDelays("nothing runs", probe.delays);
 }
 
 /// Runs an engine that does what the arguments say.
@@ -138,11 +138,11 @@ void MeasureRun(MainWindow& window, const std::string& engine, const std::string
     delays = probe.delays;
   }
   fmt::print("{}: {}\n", what, FromQt(run.Sentence()));
-  TellDelays(what, delays);
+  ReportDelays(what, delays);
   const std::uint64_t lines = run.Log().Dropped() + run.Log().Count();
-  TellPeer("lines that came", static_cast<double>(lines), "");
-  TellPeer("lines on screen", static_cast<double>(run.Log().Count()), "");
-  TellPeer("memory", static_cast<double>(os::ResidentMemory()) / (1 << 20), "MB");
+  ReportPeer("lines that came", static_cast<double>(lines), "");
+  ReportPeer("lines on screen", static_cast<double>(run.Log().Count()), "");
+  ReportPeer("memory", static_cast<double>(os::ResidentMemory()) / (1 << 20), "MB");
 }
 
 void Measure() {

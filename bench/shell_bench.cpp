@@ -119,12 +119,12 @@ void MeasurePages(MainWindow& window) {
     }
     times.push_back(Median(ofPage));
   }
-  Tell("select a node until its page is drawn, median of all pages", Median(times), 30, "ms");
-  Tell("the same, slowest page", *std::ranges::max_element(times), 100, "ms");
+  Report("select a node until its page is drawn, median of all pages", Median(times), 30, "ms");
+  Report("the same, slowest page", *std::ranges::max_element(times), 100, "ms");
   QMainWindow plain;
   plain.resize(window.size());
   plain.show();
-  TellPeer("  peer: a form of 20 plain fields", MedianOf([&] { ShowPlainForm(plain); }), "ms");
+  ReportPeer("  peer: a form of 20 plain fields", MedianOf([&] { ShowPlainForm(plain); }), "ms");
 }
 
 void MeasureChanges(MainWindow& window, const std::string& setup, double limit) {
@@ -139,12 +139,12 @@ void MeasureChanges(MainWindow& window, const std::string& setup, double limit) 
     Settle(window);
   };
   change();
-  Tell(fmt::format("change a value until all views show it, {}", setup), MedianOf(change), limit, "ms");
-  Tell(fmt::format("undo of one change, {}", setup), MedianOf([&] {
-         frame.Undo();
-         Settle(window);
-       }),
-       30, "ms");
+  Report(fmt::format("change a value until all views show it, {}", setup), MedianOf(change), limit, "ms");
+  Report(fmt::format("undo of one change, {}", setup), MedianOf([&] {
+           frame.Undo();
+           Settle(window);
+         }),
+         30, "ms");
 }
 
 // ---- Processed data
@@ -172,11 +172,11 @@ void MeasureProcessedData(MainWindow& window, int pages, double limit) {
   frame.RebuildProcessedData();
   frame.GoToPath("ProcData/Preprocessed data/Group 0/Quantity 2");
   Settle(window);
-  Tell(fmt::format("rebuild {} pages of processed data until they are drawn", manager.PageCount()), MedianOf([&] {
-         frame.RebuildProcessedData();
-         Settle(window);
-       }),
-       limit, "ms");
+  Report(fmt::format("rebuild {} pages of processed data until they are drawn", manager.PageCount()), MedianOf([&] {
+           frame.RebuildProcessedData();
+           Settle(window);
+         }),
+         limit, "ms");
 }
 
 void Measure(const QString& self) {
@@ -189,16 +189,16 @@ void Measure(const QString& self) {
 
   const QString quarzel = QString::fromUtf8(TERVANE_BIN_DIR "/quarzel");
   StartOf(quarzel, {few, "--screenshot", picture});  // warm
-  Tell("start of the process until the picture of its window is saved",
-       StartOf(quarzel, {few, "--screenshot", picture}), 400, "ms");
-  TellPeer("  peer: a bare window of the toolkit", StartOf(self, {"--bare-window", picture}), "ms");
+  Report("start of the process until the picture of its window is saved",
+         StartOf(quarzel, {few, "--screenshot", picture}), 400, "ms");
+  ReportPeer("  peer: a bare window of the toolkit", StartOf(self, {"--bare-window", picture}), "ms");
   {
     MainWindow window(program);
     window.resize(1280, 800);
     window.show();
     window.OpenDocument(few);
     Settle(window);
-    Tell("resident memory with one default setup", static_cast<double>(os::ResidentMemory()) / (1 << 20), 120, "MB");
+    Report("resident memory with one default setup", static_cast<double>(os::ResidentMemory()) / (1 << 20), 120, "MB");
     MeasurePages(window);
     MeasureChanges(window, "default setup", 16);
     MeasureProcessedData(window, 1000, 200);
@@ -222,12 +222,12 @@ void Measure(const QString& self) {
   MeasureChanges(window, "10,000 items", 50);
   window.Frame()->GoToPath("ExtraParams");
   Settle(window);
-  TellPeer("select the page of 10,000 rows", MedianOf([&] {
-             window.Frame()->GoToPath("SimSpec/SimTitle");
-             window.Frame()->GoToPath("ExtraParams");
-             Settle(window);
-           }),
-           "ms");
+  ReportPeer("select the page of 10,000 rows", MedianOf([&] {
+               window.Frame()->GoToPath("SimSpec/SimTitle");
+               window.Frame()->GoToPath("ExtraParams");
+               Settle(window);
+             }),
+             "ms");
 }
 
 }  // namespace

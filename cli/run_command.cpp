@@ -50,7 +50,7 @@ class TerminalShell : public EngineShell {
   void Follow(SetupRun& run);
   void CopyLog(LogReader& log, LineCutter& cutter);
   void Understand(const LogPiece& lines);
-  void Tell(const SetupRun& run, const std::string& sentence);
+  void Report(const SetupRun& run, const std::string& sentence);
 
   const CFlowModelDoc& document_;
   const RunOptions& options_;
@@ -68,14 +68,14 @@ void TerminalShell::Start(const CYbSimpleLaunch& launch, bool /*showsProgress*/)
   const std::optional<RunRequest> request = RequestOf(launch, document_.getResultFolder(), places, problem);
   os::KeepEndRequests();
   if (!request || !run.Start(*request, problem)) {
-    Tell(run, problem);
+    Report(run, problem);
     return;
   }
   Follow(run);
   run.MarkReported();
   const RunOutcome outcome = run.Outcome();
   if (outcome != RunOutcome::NotStarted) status_ = outcome == RunOutcome::Done ? kDone : kFindings;
-  Tell(run, OutcomeSentence(run.State()));
+  Report(run, OutcomeSentence(run.State()));
   if (isInterrupted_) status_ = kInterrupted;
 }
 
@@ -111,7 +111,7 @@ void TerminalShell::Understand(const LogPiece& lines) {
     if (std::optional<EngineMessage> message = EngineMessageOf(lines.Line(i))) messages_.push_back(std::move(*message));
 }
 
-void TerminalShell::Tell(const SetupRun& run, const std::string& sentence) {
+void TerminalShell::Report(const SetupRun& run, const std::string& sentence) {
   fmt::print(streams_.err, "{}: {}\n", options_.file, sentence);
   if (!options_.json) return;
   const RunState& state = run.State();

@@ -24,7 +24,7 @@ class Host {
   enum class Buttons { Ok, OkCancel, YesNo, YesNoCancel };
   enum class Answer { Ok, Cancel, Yes, No };
   virtual Answer Ask(const std::string& text, Icon icon, Buttons buttons) = 0;
-  void Tell(const std::string& text, Icon icon) { Ask(text, icon, Buttons::Ok); }
+  void ShowMessage(const std::string& text, Icon icon) { Ask(text, icon, Buttons::Ok); }
 
   /// What a file dialog shows. The filter is a list of text and patterns in turn, as "Grid file (*.nds2)|*.nds2||".
   struct FileQuestion {

@@ -39,18 +39,18 @@ class DeclaredKey {
  public:
   /// The choices must outlive the declaration: a constant beside their enumeration.
   DeclaredKey& OneOf(KeyChoices choices) {
-    return Tell([&](KeyFacts& facts) { facts.choices = choices; });
+    return AddFacts([&](KeyFacts& facts) { facts.choices = choices; });
   }
   /// The file holds the base unit of the quantity.
   DeclaredKey& Quantity(int itemType) {
-    return Tell([&](KeyFacts& facts) { facts.itemType = itemType; });
+    return AddFacts([&](KeyFacts& facts) { facts.itemType = itemType; });
   }
   /// A unit that never changes.
   DeclaredKey& Unit(std::string_view text) {
-    return Tell([&](KeyFacts& facts) { facts.unit = text; });
+    return AddFacts([&](KeyFacts& facts) { facts.unit = text; });
   }
   DeclaredKey& Range(double least, double greatest) {
-    return Tell([&](KeyFacts& facts) { facts.least = least, facts.greatest = greatest; });
+    return AddFacts([&](KeyFacts& facts) { facts.least = least, facts.greatest = greatest; });
   }
   DeclaredKey& AtLeast(double least) { return Range(least, std::numeric_limits<double>::infinity()); }
   /// The member in which the node holds a value that is read and written through functions.
@@ -65,7 +65,7 @@ class DeclaredKey {
   DeclaredKey(KeyFacts* facts, const void** member) : facts_(facts), member_(member) {}
 
   template <class Change>
-  DeclaredKey& Tell(const Change& change) {
+  DeclaredKey& AddFacts(const Change& change) {
     if (facts_) change(*facts_);
     return *this;
   }

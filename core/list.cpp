@@ -19,7 +19,7 @@ CYbSEKvfBase* CYbSEKvfListBaseInterface::GetItemNode(int number) const {
 }
 
 int CYbSEKvfListBaseInterface::GetNumberWhatIs(const CYbSEKvfBase* node) const {
-  const std::ptrdiff_t place = PlaceOf(node) - static_cast<std::ptrdiff_t>(plainChildren_);
+  const std::ptrdiff_t place = IndexOfChild(node) - static_cast<std::ptrdiff_t>(plainChildren_);
   return place < 0 ? -1 : static_cast<int>(place) + 1;
 }
 

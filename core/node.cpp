@@ -38,7 +38,7 @@ void CYbSEKvfBase::AddChild(std::shared_ptr<CYbSEKvfBase> child) {
 }
 
 std::shared_ptr<CYbSEKvfBase> CYbSEKvfBase::RemoveChild(CYbSEKvfBase* child) {
-  const std::ptrdiff_t place = PlaceOf(child);
+  const std::ptrdiff_t place = IndexOfChild(child);
   if (place < 0) return nullptr;
   std::shared_ptr<CYbSEKvfBase> removed = std::move(children_[static_cast<std::size_t>(place)]);
   children_.erase(children_.begin() + place);
@@ -47,14 +47,14 @@ std::shared_ptr<CYbSEKvfBase> CYbSEKvfBase::RemoveChild(CYbSEKvfBase* child) {
 }
 
 void CYbSEKvfBase::SwapChilds(CYbSEKvfBase* a, CYbSEKvfBase* b) {
-  const std::ptrdiff_t placeA = PlaceOf(a);
-  const std::ptrdiff_t placeB = PlaceOf(b);
+  const std::ptrdiff_t placeA = IndexOfChild(a);
+  const std::ptrdiff_t placeB = IndexOfChild(b);
   if (placeA >= 0 && placeB >= 0)
     std::swap(children_[static_cast<std::size_t>(placeA)], children_[static_cast<std::size_t>(placeB)]);
 }
 
 CYbSEKvfBase* CYbSEKvfBase::GetNextChild(const CYbSEKvfBase* child) const {
-  const std::ptrdiff_t place = PlaceOf(child);
+  const std::ptrdiff_t place = IndexOfChild(child);
   const auto next = static_cast<std::size_t>(place + 1);
   return place >= 0 && next < children_.size() ? children_[next].get() : nullptr;
 }
@@ -66,11 +66,11 @@ CYbSEKvfBase* CYbSEKvfBase::GetChild(int number) const {
 }
 
 int CYbSEKvfBase::GetNumberWhatIs(const CYbSEKvfBase* child) const {
-  const std::ptrdiff_t place = PlaceOf(child);
+  const std::ptrdiff_t place = IndexOfChild(child);
   return place < 0 ? -1 : static_cast<int>(place) + 1;
 }
 
-std::ptrdiff_t CYbSEKvfBase::PlaceOf(const CYbSEKvfBase* child) const {
+std::ptrdiff_t CYbSEKvfBase::IndexOfChild(const CYbSEKvfBase* child) const {
   if (!child) return -1;
   const auto isAtHint = [&] {
     return child->placeHint_ < children_.size() && children_[child->placeHint_].get() == child;

@@ -224,7 +224,7 @@ class CYbSEKvfBase {
   std::vector<std::shared_ptr<CYbSEKvfBase>> children_;
   std::size_t plainChildren_ = 0;
   /// Place of a child in `children_`, or -1.
-  std::ptrdiff_t PlaceOf(const CYbSEKvfBase* child) const;
+  std::ptrdiff_t IndexOfChild(const CYbSEKvfBase* child) const;
   bool MissedSection(const CYbSEKvfBase& child) const { return child.missedSection_; }
 
  private:

@@ -286,7 +286,7 @@ class PieceReader {
   int GetAtOnce(const Box& box, std::span<float> values) {
     progress_.ThrowIfCancelled();
     const int status = GetLocked(box, values);
-    progress_.Tell(static_cast<double>(done_ += values.size()) / size_);
+    progress_.Report(static_cast<double>(done_ += values.size()) / size_);
     for (; status == NC_NOERR && !values.empty(); values = values.subspan(std::min(kPiece, values.size())))
       convert_(values.first(std::min(kPiece, values.size())));
     return status;
@@ -374,7 +374,7 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
   bool fits = true;
   for (std::size_t slice = 0; slice < slices; ++slice) {
     progress.ThrowIfCancelled();
-    progress.Tell(static_cast<double>(slice) / static_cast<double>(slices));
+    progress.Report(static_cast<double>(slice) / static_cast<double>(slices));
     std::ptrdiff_t target = origin;
     if (isSliced) {
       start[outermost] = slice;
@@ -404,7 +404,7 @@ std::string DataFile::State::ReadRaster(const ItemStorage& storage, const DataIt
   const int nx = item.geometry.nx, ny = item.geometry.ny;
   for (int j = 0; j < ny; j += kRows) {
     progress.ThrowIfCancelled();
-    progress.Tell(static_cast<double>(j) / ny);
+    progress.Report(static_cast<double>(j) / ny);
     const CellWindow rows{0, j, nx, std::min(kRows, ny - j)};
     const std::size_t first = static_cast<std::size_t>(j) * static_cast<std::size_t>(nx);
     std::string error = raster->Read(storage.variable, rows, values.subspan(first, rows.CellCount()));

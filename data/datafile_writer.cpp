@@ -311,7 +311,7 @@ std::string DataFileWriter::State::PutRows(int variable, std::size_t layer, std:
   const std::size_t atOnce = content.isCompressed ? kTileRows : std::max<std::size_t>(kPiece / nx, 1);
   for (std::size_t row = 0; row < ny; row += atOnce) {
     if (progress.IsCancelled()) return kCancelled;
-    progress.Tell(static_cast<double>(row) / static_cast<double>(ny));
+    progress.Report(static_cast<double>(row) / static_cast<double>(ny));
     if (content.dimensions > 1) {
       start[y] = row;
       count[y] = std::min(atOnce, ny - row);

@@ -21,7 +21,7 @@ FileResult WriteSeriesFile(const std::string& path, const NewSeries& series, Pro
     error = writer.AddStep(series.times[step]);
     if (error.empty()) error = writer.Put(1, {&series.values[step], 1}, {});
     if (error.empty() && progress.IsCancelled()) error = fmt::format("cannot write {}: {}", path, kCancelled);
-    progress.Tell(static_cast<double>(step) / static_cast<double>(series.times.size()));
+    progress.Report(static_cast<double>(step) / static_cast<double>(series.times.size()));
   }
   if (!error.empty()) return {std::move(error), {}};
   return writer.Finish(progress);

@@ -138,7 +138,7 @@ void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& act
   if (listener_) listener_(hint);
 }
 
-void EditSession::ValidateAllAndTell() {
+void EditSession::ValidateAllAndNotify() {
   ++changes_;
   document_->Root().TakeRevalidateAll();
   document_->Root().Validate();
@@ -147,13 +147,13 @@ void EditSession::ValidateAllAndTell() {
 
 bool EditSession::Undo() {
   if (!undo_->Undo()) return false;
-  ValidateAllAndTell();
+  ValidateAllAndNotify();
   return true;
 }
 
 bool EditSession::Redo() {
   if (!undo_->Redo()) return false;
-  ValidateAllAndTell();
+  ValidateAllAndNotify();
   return true;
 }
 

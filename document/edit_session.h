@@ -92,7 +92,7 @@ class EditSession {
   void TakeLock();
   /// Ends what loading began.
   void Begin();
-  void ValidateAllAndTell();
+  void ValidateAllAndNotify();
   std::string AutosaveText(std::string& error) const;
   void RemoveAutosavesBut(const std::string& kept);
 

@@ -22,7 +22,7 @@ bool CFlowModelDoc::SaveForRun() {
   EngineShell* shell = GetEngineShell();
   if (!shell) return false;
   if (!shell->HasChanges() || shell->DoFileSave()) return true;
-  shell->Outside().Tell("Unable to run setup: Failed to save specification file.", Host::Icon::Error);
+  shell->Outside().ShowMessage("Unable to run setup: Failed to save specification file.", Host::Icon::Error);
   return false;
 }
 

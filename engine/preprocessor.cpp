@@ -29,7 +29,7 @@ std::string WithDetail(const Finding& finding) {
   return finding.detail.empty() ? finding.text : fmt::format("{} ({})", finding.text, finding.detail);
 }
 
-std::string PlaceOf(const std::string& path, const Finding& finding) {
+std::string FindingPath(const std::string& path, const Finding& finding) {
   return finding.key.empty() ? path : path + ":" + finding.key;
 }
 
@@ -111,7 +111,7 @@ bool Preprocessor::CheckSetup() {
         isNeeded ? WhyNotMet(file->File.Absolute(), file->Items, file->SelectionRequest()) : std::string();
     if (!problem.empty()) return log_.Error(place.path + ":FILE_NAME", problem);
     for (const Finding& finding : place.node.Findings()) {
-      const std::string where = PlaceOf(place.path, finding);
+      const std::string where = FindingPath(place.path, finding);
       if (finding.severity == Severity::Error) log_.Error(where, WithDetail(finding));
       if (finding.severity == Severity::Warning) log_.Warning(where, WithDetail(finding));
     }

@@ -71,7 +71,7 @@ class CellChoices : public std::vector<CellChoice> {
     return texts;
   }
   /// The place of a stored value from 0 on; -1 when it is none of them.
-  int PlaceOf(const std::string& value) const {
+  int IndexOf(const std::string& value) const {
     for (std::size_t i = 0; i < size(); ++i)
       if ((*this)[i].value == value) return static_cast<int>(i);
     return -1;

@@ -38,7 +38,7 @@ bool BrowseDataFile(DataFileNode& node, Host::FileQuestion question, Host& host)
   if (!path) return false;
   const auto file = DataFileFactsOf(*path);
   if (!file->error.empty()) {
-    host.Tell(file->error, Host::Icon::Error);
+    host.ShowMessage(file->error, Host::Icon::Error);
     return false;
   }
   Host::ItemQuestion items;
@@ -71,7 +71,7 @@ bool BrowseShapeFile(CData2DShpFile& node, Host::FileQuestion question, Host& ho
   if (!path) return false;
   CYbShapeData shapes;
   if (const FileResult result = shapes.ReadShapeAndDbfFile(*path, ""); !result.Ok()) {
-    host.Tell(result.error, Host::Icon::Error);
+    host.ShowMessage(result.error, Host::Icon::Error);
     return false;
   }
   Host::ItemQuestion fields;

@@ -31,7 +31,7 @@ ControlKind ControlKindOf(CellKind kind) {
 /// The place of the chosen option; what is none of them stands in quotes, so that it is no place.
 std::string OptionText(const TableForm& table, const TableColumn& column, int row) {
   const std::string stored = CellText(column.get(row));
-  const int place = table.Choices(row, column).PlaceOf(stored);
+  const int place = table.Choices(row, column).IndexOf(stored);
   return place >= 0 ? std::to_string(place) : stored.empty() ? stored : "'" + stored + "'";
 }
 
@@ -47,7 +47,7 @@ std::string OptionValue(const TableForm& table, const TableColumn& column, int r
 
 Control& AddRowField(PageForm& form, std::shared_ptr<TableForm> table, std::shared_ptr<TableColumn> column,
                      std::string label, CellKind kind) {
-  table->TellCurrentRow();
+  table->ReportCurrentRow();
   Control& control = form.Bare(ControlKindOf(kind), std::move(label));
   // Paths and findings are those of the row, not of the page's node.
   control.node = nullptr;

@@ -84,7 +84,7 @@ bool TableForm::Choose(int row) {
   current_ = row;
   identity_ = rows_->Identity(row);
   if (chosen_) chosen_(row);
-  return chosen_ || (isOther && tellsCurrent_);
+  return chosen_ || (isOther && reportsCurrent_);
 }
 
 // ---- Cells
@@ -101,7 +101,7 @@ std::string TableForm::ShownCell(int row, const TableColumn& column) const {
   if (Kind(row, column) != CellKind::Choice) return CellText(column.get(row), UnitOf(column), column.format);
   std::string stored = Cell(row, column);
   const CellChoices choices = Choices(row, column);
-  const int place = choices.PlaceOf(stored);
+  const int place = choices.IndexOf(stored);
   return place >= 0 ? choices[static_cast<std::size_t>(place)].text : std::move(stored);
 }
 
@@ -134,7 +134,7 @@ std::string TableForm::Enter(int row, const TableColumn& column, const std::stri
   if (Kind(row, column) == CellKind::Choice) {
     const CellChoices choices = Choices(row, column);
     if (choices.empty()) return "there is nothing to choose from";
-    if (choices.PlaceOf(typed) < 0) return fmt::format("one of {} was expected", fmt::join(choices.ShownTexts(), ", "));
+    if (choices.IndexOf(typed) < 0) return fmt::format("one of {} was expected", fmt::join(choices.ShownTexts(), ", "));
   }
   const CYbSEKvfBase* node = rows_->Node(row);
   std::string expected = EnterCell(value, typed, UnitOf(column), node ? node : node_);

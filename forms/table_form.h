@@ -97,7 +97,7 @@ class TableForm {
   /// Told the row that the user makes the current one.
   void OnChoose(std::function<void(int row)> chosen) { chosen_ = std::move(chosen); }
   /// Something on the page shows the current row, and so follows when it becomes another one.
-  void TellCurrentRow() { tellsCurrent_ = true; }
+  void ReportCurrentRow() { reportsCurrent_ = true; }
   /// Texts in front of the rows, instead of their numbers.
   void RowHeads(std::function<std::string(int row)> head) { rowHead_ = std::move(head); }
   void SetDisplayUnits(const DisplayUnits* units) { displayUnits_ = units; }
@@ -232,7 +232,7 @@ class TableForm {
   bool isShownOnly_ = false, keepsRows_ = false, keepsOrder_ = false;
   std::function<std::string(int)> rowHead_;
   std::function<void(int)> chosen_;
-  bool tellsCurrent_ = false;
+  bool reportsCurrent_ = false;
   int current_ = 0;
   const void* identity_ = nullptr;  ///< Of the current row.
 };

@@ -138,7 +138,7 @@ class Triangulation {
     constexpr std::uint32_t kAskEvery = 1024;
     if (end - begin > kAskEvery) {
       progress_.ThrowIfCancelled();
-      progress_.Tell(static_cast<double>(begin) / static_cast<double>(points_.size()));
+      progress_.Report(static_cast<double>(begin) / static_cast<double>(points_.size()));
     }
     if (end - begin == 2) {
       const Edge e = edges_.Make(begin, begin + 1);

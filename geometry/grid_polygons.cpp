@@ -148,7 +148,7 @@ class SpanPainter {
       if (&band != &bands_.back()) first += static_cast<std::ptrdiff_t>(kBandRows) * nx_;
     }
     count_ = 0;
-    progress.Tell(1);
+    progress.Report(1);
   }
 
  private:
@@ -173,7 +173,7 @@ void PutPolygons(const std::vector<Shape>& shapes, const std::vector<float>& cod
   SpanPainter painter(geometry, values);
   const ProgressPart finding = progress.Part(0, 0.7), painting = progress.Part(0.7, 1);
   for (std::size_t k = 0; k < shapes.size(); ++k) {
-    finding.Tell(static_cast<double>(k) / static_cast<double>(shapes.size()));
+    finding.Report(static_cast<double>(k) / static_cast<double>(shapes.size()));
     if (codes[k] == deleteValue) continue;
     for (const PolygonRaster::Span& span : raster.Spans(shapes[k], 0, shapes[k].parts.size()))
       painter.Add(span, codes[k]);
@@ -195,7 +195,7 @@ std::vector<float> DomainOfPolygons(const std::vector<Shape>& shapes, const Grid
   };
   const ProgressPart marking = progress.Part(0, 0.7), taking = progress.Part(0.7, 1);
   for (const Shape& shape : shapes) {
-    marking.Tell(static_cast<double>(&shape - shapes.data()) / static_cast<double>(shapes.size()));
+    marking.Report(static_cast<double>(&shape - shapes.data()) / static_cast<double>(shapes.size()));
     mark(shape, 0, shape.parts.size(), kInside | kOuter);
     for (std::size_t part = 0; shape.parts.size() > 1 && part < shape.parts.size(); ++part)
       mark(shape, part, part + 1, kOuter);
@@ -205,7 +205,7 @@ std::vector<float> DomainOfPolygons(const std::vector<Shape>& shapes, const Grid
   const std::ptrdiff_t nx = geometry.nx, ny = geometry.ny;
   for (std::ptrdiff_t j = 0; j < ny; ++j) {
     taking.ThrowIfCancelled();
-    taking.Tell(static_cast<double>(j) / static_cast<double>(ny));
+    taking.Report(static_cast<double>(j) / static_cast<double>(ny));
     for (std::ptrdiff_t i = 0; i < nx; ++i) {
       const unsigned char* const cell = marks.data() + j * nx + i;
       if (!(*cell & kInside)) continue;

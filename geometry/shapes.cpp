@@ -143,7 +143,7 @@ class ShapeFileReader {
     const ProgressPart taking = progress_.Part(kReading, 1);
     for (int i = 0; i < count; ++i) {
       if (taking.IsCancelled()) return At(kCancelled);
-      taking.Tell(static_cast<double>(i) / count);
+      taking.Report(static_cast<double>(i) / count);
       if (!columns.empty() && DBFIsRecordDeleted(table_.get(), i)) {
         ++deleted;
         continue;

@@ -107,8 +107,8 @@ bool HasShownLayer(const COverlayListKvf& list) {
 
 std::string PrepareGridState(const COverlaysKvf& overlays, const FileName& grid, std::optional<int> item, Host& host) {
   if (grid.IsEmpty()) {
-    host.Tell("Grid File Name is empty. Please select a Grid File or create a new Grid File before editing.",
-              Host::Icon::Warning);
+    host.ShowMessage("Grid File Name is empty. Please select a Grid File or create a new Grid File before editing.",
+                     Host::Icon::Warning);
     return {};
   }
   const std::string absolute = grid.Absolute();

@@ -215,7 +215,7 @@ std::size_t DataFileView::ColumnOf(int number) const {
   return found == series_.end() ? 0 : static_cast<std::size_t>(found - series_.begin());
 }
 
-std::pair<std::size_t, std::size_t> DataFileView::PlaceOf(int i, int j) const {
+std::pair<std::size_t, std::size_t> DataFileView::TableCellOf(int i, int j) const {
   return {RowCount() - 1 - static_cast<std::size_t>(j), static_cast<std::size_t>(i)};
 }
 

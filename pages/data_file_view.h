@@ -78,7 +78,7 @@ class DataFileView {
   /// The column of a series; the first one of other items.
   std::size_t ColumnOf(int number) const;
   /// Where a cell of the grid stands.
-  std::pair<std::size_t, std::size_t> PlaceOf(int i, int j) const;
+  std::pair<std::size_t, std::size_t> TableCellOf(int i, int j) const;
   /// The row of a step of series; the table has it afterwards. True in `isMoved` when it has other rows than before.
   std::size_t ShowRowOf(std::size_t step, bool& isMoved);
   /// What stands above the table: the unit of a grid, and which part of long series is shown.

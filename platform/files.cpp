@@ -272,7 +272,7 @@ ReadOutcome ReadOnce(const std::string& path, FileContent& content, ProgressPart
     }
     if (done == 0) return ReadOutcome::Shrunk;
     content.size += done;
-    progress.Tell(static_cast<double>(content.size) / static_cast<double>(size));
+    progress.Report(static_cast<double>(content.size) / static_cast<double>(size));
   }
   std::fill_n(content.data.get() + size, FileContent::kNulsBehind, '\0');
   char more;

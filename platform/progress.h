@@ -27,7 +27,7 @@ class Progress {
  private:
   friend class ProgressPart;
 
-  void Tell(double done) {
+  void Report(double done) {
     double before = done_.load(std::memory_order_relaxed);
     while (before < done && !done_.compare_exchange_weak(before, done, std::memory_order_relaxed)) {
     }
@@ -51,8 +51,8 @@ class ProgressPart {
     return part;
   }
   /// How far this part is, from 0 to 1.
-  void Tell(double done) const {
-    if (whole_) whole_->Tell(from_ + done * length_);
+  void Report(double done) const {
+    if (whole_) whole_->Report(from_ + done * length_);
   }
   bool IsCancelled() const { return whole_ && whole_->IsCancelled(); }
   void ThrowIfCancelled() const {

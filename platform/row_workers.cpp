@@ -25,7 +25,7 @@ void ForRows(int rows, int rowsAtOnce, int threads, ProgressPart progress,
         if (progress.IsCancelled()) return;
         const int begin = block * rowsAtOnce;
         work(begin, begin + std::min(rowsAtOnce, rows - begin));
-        progress.Tell(static_cast<double>(++done) / blocks);
+        progress.Report(static_cast<double>(++done) / blocks);
       }
     } catch (...) {
       const std::lock_guard lock(mutex);

@@ -52,7 +52,7 @@ class LineProgress {
     constexpr std::size_t kLines = 4096;
     if (lines.Number() % kLines != 0) return;
     progress_.ThrowIfCancelled();
-    progress_.Tell(1 - static_cast<double>(lines.Left()) / static_cast<double>(size_));
+    progress_.Report(1 - static_cast<double>(lines.Left()) / static_cast<double>(size_));
   }
 
  private:

@@ -70,13 +70,13 @@ DocumentFrame::DocumentFrame(std::unique_ptr<EditSession> session, const QString
   processed_.start(kProcessedInterval);
 
   if (CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport()) report->Load();
-  TellProcessedData();
+  ShowProcessedDataNews();
   Refresh(kDataChanged);
   if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));
   if (session_->IsReadOnly())
     ShowBanner(tr("Read-only: %1.").arg(ToQt(session_->ReadOnlyReason())),
                {{tr("Save &As…"), [this] { emit SaveAsWanted(); }}});
-  TellReport();
+  ShowLoadReport();
   run_->FindRun();
 }
 
@@ -349,7 +349,7 @@ void DocumentFrame::RebuildProcessedData() {
     current_ = 0;
   }
   report->Load();
-  TellProcessedData();
+  ShowProcessedDataNews();
   Refresh(kItemDeleted | kItemAdded | kTreeRebuilt | kRefreshPlots | kDataChanged);
   if (!isShown) return;
   isRebuilding_ = isGoing_ = true;
@@ -373,7 +373,7 @@ void DocumentFrame::CheckProcessedData() {
   if (page_) page_->Sync();
 }
 
-void DocumentFrame::TellProcessedData() {
+void DocumentFrame::ShowProcessedDataNews() {
   const CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
   const std::string problem = report ? report->Problem() : std::string();
   if (problem != toldProblem_ && !problem.empty()) Log(tr("Processed data: %1").arg(ToQt(problem)));
@@ -428,10 +428,10 @@ void DocumentFrame::FollowRun() {
   connect(run_.get(), &DocumentRun::MessagesCame, this, [this] {
     if (!findingsLater_.isActive()) findingsLater_.start();
   });
-  connect(run_.get(), &DocumentRun::Ended, this, &DocumentFrame::TellRunEnd);
+  connect(run_.get(), &DocumentRun::Ended, this, &DocumentFrame::OnRunEnd);
 }
 
-void DocumentFrame::TellRunEnd(bool isDone, bool wasFound) {
+void DocumentFrame::OnRunEnd(bool isDone, bool wasFound) {
   ShowFindings();
   delete runBanner_;
   QString text = run_->Sentence();
@@ -481,7 +481,7 @@ bool DocumentFrame::Save(const std::string& path) {
   Commit();
   if (!session_->SaveAs(path)) {
     Log(tr("Not saved: %1").arg(ToQt(session_->Error())));
-    host_.Tell(session_->Error(), Host::Icon::Error);
+    host_.ShowMessage(session_->Error(), Host::Icon::Error);
     return false;
   }
   Log(tr("Saved as %1").arg(ToQt(path)));
@@ -501,10 +501,10 @@ void DocumentFrame::AddBanner(Banner* banner) {
   all_->addWidget(banner);
 }
 
-void DocumentFrame::TellReport() {
+void DocumentFrame::ShowLoadReport() {
   const LoadReport& report = session_->Document().Report();
   for (const LoadReport::Entry& entry : report.entries)
-    if (entry.kind == LoadReport::Kind::Warning) host_.Tell(entry.text, Host::Icon::Warning);
+    if (entry.kind == LoadReport::Kind::Warning) host_.ShowMessage(entry.text, Host::Icon::Warning);
   const int version = session_->Document().Global().ReadDocVersion();
   if (!session_->Path().empty() && version != CFlowModelDocVersionKvf::kWrittenVersion && report.unread.empty()) {
     const QString written = version < 0 ? tr("an unnumbered version") : tr("version %1").arg(version);

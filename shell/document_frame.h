@@ -110,7 +110,7 @@ class DocumentFrame : public QWidget {
   void ShowPage(CYbSEKvfBase& node, const std::string& control);
   /// Looks whether the preprocessor's report is another one.
   void CheckProcessedData();
-  void TellProcessedData();
+  void ShowProcessedDataNews();
   void Remember(std::uint64_t serial);
   /// Selects the node's entry, preferably in the tree that is shown; false when no tree has one.
   bool SelectInTrees(std::uint64_t serial);
@@ -119,10 +119,10 @@ class DocumentFrame : public QWidget {
   void LeaveGoneNode();
   void AddBanner(Banner* banner);
   void RunAutosave();
-  void TellReport();
+  void ShowLoadReport();
   void FollowRun();
   void ShowFindings();
-  void TellRunEnd(bool isDone, bool wasFound);
+  void OnRunEnd(bool isDone, bool wasFound);
 
   std::unique_ptr<EditSession> session_;
   QString name_;

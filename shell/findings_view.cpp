@@ -20,7 +20,7 @@ namespace {
 
 enum Column { kKindColumn, kPlaceColumn, kTextColumn, kLineColumn };
 
-QString PlaceOf(const SetupFinding& finding) {
+QString PathText(const SetupFinding& finding) {
   return ToQt(finding.key.empty() ? finding.path : finding.path + ":" + finding.key);
 }
 
@@ -76,12 +76,12 @@ void FindingsView::Show(std::vector<SetupFinding> findings) {
     const bool isWarning = finding.kind == SetupFinding::Kind::Warning;
     item->setIcon(kKindColumn, Theme::Get().Icon(isError ? "error" : isWarning ? "warning" : "note"));
     item->setText(kKindColumn, KindText(finding.kind));
-    item->setText(kPlaceColumn, PlaceOf(finding));
+    item->setText(kPlaceColumn, PathText(finding));
     QString text = Translated(finding.text).simplified();
     if (!finding.detail.empty()) text += " — " + ToQt(finding.detail);
     item->setText(kTextColumn, text);
     item->setToolTip(kTextColumn, text);
-    item->setToolTip(kPlaceColumn, PlaceOf(finding));
+    item->setToolTip(kPlaceColumn, PathText(finding));
     if (finding.line > 0) item->setText(kLineColumn, QString::number(finding.line));
     items << item;
   }

@@ -168,8 +168,8 @@ bool LibraryTab::Save(const std::string& path) {
   Commit();
   const bool isRenamed = path != Path();
   const FileResult result = editor_.Save(path);
-  if (!result.Ok()) host_.Tell(result.error, Host::Icon::Error);
-  if (!result.note.empty()) host_.Tell(result.note, Host::Icon::Information);
+  if (!result.Ok()) host_.ShowMessage(result.error, Host::Icon::Error);
+  if (!result.note.empty()) host_.ShowMessage(result.note, Host::Icon::Information);
   // The page bears the file's name.
   if (result.Ok() && isRenamed) BuildPage();
   Sync();

@@ -159,7 +159,7 @@ bool MainWindow::OpenDocument(const QString& path) {
   std::string error;
   auto session = EditSession::Open(file, program_.RecoveryFolder(), error);
   if (!session) {
-    host_.Tell(error, Host::Icon::Error);
+    host_.ShowMessage(error, Host::Icon::Error);
     return false;
   }
   const bool mayRecover = !session->IsReadOnly();
@@ -177,12 +177,12 @@ bool MainWindow::OpenDocument(const QString& path) {
                             if (auto recovered = EditSession::Recover(recovery, program_.RecoveryFolder(), why))
                               AddFrame(std::move(recovered))->Log(tr("Recovered from %1").arg(ToQt(recovery.autosave)));
                             else
-                              host_.Tell(why, Host::Icon::Error);
+                              host_.ShowMessage(why, Host::Icon::Error);
                           });
                         }},
                        {tr("&Throw Away"), [this, recovery = *recovery] {
                           std::string why;
-                          if (!DiscardRecovery(recovery, why)) host_.Tell(why, Host::Icon::Error);
+                          if (!DiscardRecovery(recovery, why)) host_.ShowMessage(why, Host::Icon::Error);
                         }}});
   }
   return true;
@@ -206,7 +206,7 @@ void MainWindow::OfferRecoveries() {
     if (auto session = EditSession::Recover(recovery, program_.RecoveryFolder(), error))
       AddFrame(std::move(session));
     else
-      host_.Tell(error, Host::Icon::Error);
+      host_.ShowMessage(error, Host::Icon::Error);
   }
 }
 
@@ -237,7 +237,7 @@ bool MainWindow::SaveDocumentAs() {
 bool MainWindow::ShowDataFile(const QString& path) {
   const std::string file = path.isEmpty() ? std::string() : FromQt(QFileInfo(path).absoluteFilePath());
   if (file.empty()) {
-    host_.Tell("No file is chosen.", Host::Icon::Warning);
+    host_.ShowMessage("No file is chosen.", Host::Icon::Warning);
     return false;
   }
   if (const LibraryKind* kind = KindOf(path)) return OpenLibrary(*kind, path);
@@ -259,10 +259,10 @@ bool MainWindow::ShowDataFile(const QString& path) {
     }
   }
   if (FileExists(file) && IsText(file) && QDesktopServices::openUrl(QUrl::fromLocalFile(ToQt(file)))) return true;
-  host_.Tell(viewer             ? viewer->Problem()
-             : FileExists(file) ? FromQt(tr("The desktop has no editor for %1.").arg(ToQt(file)))
-                                : FromQt(tr("%1 is not there.").arg(ToQt(file))),
-             Host::Icon::Error);
+  host_.ShowMessage(viewer             ? viewer->Problem()
+                    : FileExists(file) ? FromQt(tr("The desktop has no editor for %1.").arg(ToQt(file)))
+                                       : FromQt(tr("%1 is not there.").arg(ToQt(file))),
+                    Host::Icon::Error);
   return false;
 }
 
@@ -283,7 +283,7 @@ bool MainWindow::OpenLibrary(const LibraryKind& kind, const QString& path) {
   }
   auto library = std::make_unique<LibraryTab>(kind, file, host_);
   if (!library->Editor().Problem().empty()) {
-    host_.Tell(library->Editor().Problem(), Host::Icon::Error);
+    host_.ShowMessage(library->Editor().Problem(), Host::Icon::Error);
     return false;
   }
   connect(library.get(), &LibraryTab::StateChanged, this, &MainWindow::SyncCommands);
@@ -338,7 +338,7 @@ void MainWindow::ReloadDocument(DocumentFrame* frame) {
   // What cannot be read takes nothing away.
   CFlowModelDoc probe;
   if (!probe.OnOpenDocument(frame->Session().Path())) {
-    host_.Tell(probe.Error(), Host::Icon::Error);
+    host_.ShowMessage(probe.Error(), Host::Icon::Error);
     return;
   }
   delete frame;
@@ -351,7 +351,7 @@ void MainWindow::ShowChanges(DocumentFrame& frame) {
   std::string error;
   const std::vector<SetupDifference> differences = frame.Session().WhatWillBeSaved(error);
   if (!error.empty()) {
-    host_.Tell(error, Host::Icon::Error);
+    host_.ShowMessage(error, Host::Icon::Error);
     return;
   }
   ChangesDialog dialog(differences, !frame.Session().IsReadOnly(), this);

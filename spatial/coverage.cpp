@@ -147,7 +147,7 @@ class CoverageBuilder {
       ++done;
     }
     LeaveIfCancelled();
-    progress_.Tell(1);
+    progress_.Report(1);
     return std::move(board_);
   }
 
@@ -251,7 +251,7 @@ CoverageRow CoverageBuilder::MakeRow(const CoverageFile& file) {
         if (file.use.kind == FileUse::Kind::Data) ReadData(row);
         if (file.use.kind == FileUse::Kind::Shape) ReadShape(row);
         if (file.use.kind == FileUse::Kind::Points) ReadPoints(row);
-        const FilePlace place = PlaceOf(file.use);
+        const FilePlace place = LocateFile(file.use);
         row.extent = place.extent;
         row.isInDegrees = place.isGeographical;
         if (row.problem.empty() && !row.isInDegrees) LookForCells(row);
@@ -261,7 +261,7 @@ CoverageRow CoverageBuilder::MakeRow(const CoverageFile& file) {
     }
   }
   Conclude(row);
-  part_.Tell(1);
+  part_.Report(1);
   return row;
 }
 
@@ -354,7 +354,7 @@ void CoverageBuilder::Conclude(CoverageRow& row) {
   if (!row.problem.empty() && !isTold) add(Severity::Error, row.problem);
   // Nodes of points have no validation.
   if (row.problem.empty() && row.file.use.kind == FileUse::Kind::Points && board_.request.domain.geometry)
-    std::ranges::move(FindMisplacement(PlaceOf(row.file.use), *board_.request.domain.geometry),
+    std::ranges::move(FindMisplacement(LocateFile(row.file.use), *board_.request.domain.geometry),
                       std::back_inserter(row.remarks));
   constexpr std::size_t kMostGaps = 5;
   for (std::size_t i = 0; i < std::min(row.gaps.size(), kMostGaps); ++i)
@@ -448,7 +448,7 @@ ForcingTotals CoverageBuilder::MakeForcing(const CoverageForcing& asked) {
   }
   totals.form = TotalFormOf(itemType, valueType);
   if (forcing.areas) AddDomainColumn(totals);
-  part_.Tell(1);
+  part_.Report(1);
   return totals;
 }
 

@@ -30,13 +30,13 @@ constexpr float kUnpaintedBoundary = -1.0F, kInside = -2.0F, kOutside = -3.0F;
 
 }  // namespace
 
-std::size_t CGeoDataBoundCondCatchmentData::PlaceOf(GridCell cell) const {
+std::size_t CGeoDataBoundCondCatchmentData::IndexOf(GridCell cell) const {
   return static_cast<std::size_t>(cell.j) * static_cast<std::size_t>(Geometry().nx) + static_cast<std::size_t>(cell.i);
 }
 
 int CGeoDataBoundCondCatchmentData::CodeAt(GridCell cell) const {
   if (cell.i < 0 || cell.j < 0 || cell.i >= Geometry().nx || cell.j >= Geometry().ny) return -10000;
-  return static_cast<int>(std::floor(Values()[PlaceOf(cell)] + 0.5F));
+  return static_cast<int>(std::floor(Values()[IndexOf(cell)] + 0.5F));
 }
 
 int CGeoDataBoundCondCatchmentData::PrepareBoundary(std::string& message) {
@@ -91,7 +91,7 @@ int CGeoDataBoundCondCatchmentData::PrepareBoundary(std::string& message) {
   BoundaryCells = std::move(cells);
   BoundaryIndex.assign(most, 0);
   for (std::size_t place = 0; place < BoundaryCells.size(); ++place)
-    BoundaryIndex[PlaceOf(BoundaryCells[place])] = static_cast<int>(place) + 1;
+    BoundaryIndex[IndexOf(BoundaryCells[place])] = static_cast<int>(place) + 1;
   OriginalCells = Values();
   OriginalDeleteValue = DeleteValue();
   SetDeleteValue(kOutside);
@@ -116,7 +116,7 @@ GridCell CGeoDataBoundCondCatchmentData::NearestBoundaryCell(double x, double y)
 int CGeoDataBoundCondCatchmentData::GetBoundaryIndex(GridCell cell) const {
   if (BoundaryIndex.empty()) return -1;
   const bool isOnGrid = cell.i >= 0 && cell.j >= 0 && cell.i < Geometry().nx && cell.j < Geometry().ny;
-  return isOnGrid ? BoundaryIndex[PlaceOf(cell)] : 0;
+  return isOnGrid ? BoundaryIndex[IndexOf(cell)] : 0;
 }
 
 void CGeoDataBoundCondCatchmentData::Paint(const std::vector<BoundaryItem>& items, bool byNumber) {
@@ -129,7 +129,7 @@ void CGeoDataBoundCondCatchmentData::Paint(const std::vector<BoundaryItem>& item
   }
   BoundaryPoints.clear();
   const auto paint = [&](std::size_t from, std::size_t to, float value) {
-    for (std::size_t place = from; place < to; ++place) cells[PlaceOf(BoundaryCells[place])] = value;
+    for (std::size_t place = from; place < to; ++place) cells[IndexOf(BoundaryCells[place])] = value;
   };
   const auto valueOf = [&](std::size_t item) {
     return byNumber ? static_cast<float>(item + 1) : static_cast<float>(items[item].type);

@@ -47,7 +47,7 @@ class CGeoDataBoundCondCatchmentData : public CTvn2DOrthoRotatedGridData {
  private:
   /// The cell's code as a whole number; -10000 off the grid.
   int CodeAt(GridCell cell) const;
-  std::size_t PlaceOf(GridCell cell) const;
+  std::size_t IndexOf(GridCell cell) const;
   void Paint(const std::vector<BoundaryItem>& items, bool byNumber);
 };
 

@@ -22,7 +22,7 @@ std::vector<int> AsItemTypes(int itemType) {
 /// What a user should know of where a valid file lies.
 std::vector<Finding> MisplacementOf(const CYbSEKvfBase& node, const FileUse& use) {
   const std::optional<GridGeometry> domain = use.isOverArea ? DomainGeometryOf(node) : std::nullopt;
-  return domain ? FindMisplacement(PlaceOf(use), *domain) : std::vector<Finding>();
+  return domain ? FindMisplacement(LocateFile(use), *domain) : std::vector<Finding>();
 }
 
 }  // namespace

@@ -23,7 +23,7 @@ Envelope InMetres(const Envelope& box, int axisUnit) {
   return {toMetres(box.xMin), toMetres(box.yMin), toMetres(box.xMax), toMetres(box.yMax)};
 }
 
-FilePlace PlaceOfItem(const std::string& path, int number) {
+FilePlace LocateItem(const std::string& path, int number) {
   FilePlace place;
   const auto facts = DataFileFactsOf(path);
   const DataItem* item = facts->Item(number);
@@ -37,7 +37,7 @@ FilePlace PlaceOfItem(const std::string& path, int number) {
   return place;
 }
 
-FilePlace PlaceOfShapes(const FileUse& use) {
+FilePlace LocateShapes(const FileUse& use) {
   FilePlace place;
   const auto facts = ShapeFactsOf(use.path);
   if (!facts->error.empty() || !facts->extent) return place;
@@ -66,10 +66,10 @@ std::string NameOf(const std::string& projection) {
 
 }  // namespace
 
-FilePlace PlaceOf(const FileUse& use) {
+FilePlace LocateFile(const FileUse& use) {
   if (use.path.empty()) return {};
-  if (use.kind == FileUse::Kind::Data) return PlaceOfItem(use.path, use.item);
-  if (use.kind == FileUse::Kind::Shape) return PlaceOfShapes(use);
+  if (use.kind == FileUse::Kind::Data) return LocateItem(use.path, use.item);
+  if (use.kind == FileUse::Kind::Shape) return LocateShapes(use);
   FilePlace place;
   const auto facts = XyzFactsOf(use.path);
   if (!facts->error.empty()) return place;

@@ -23,7 +23,7 @@ struct FilePlace {
   std::string projection;      ///< Its text; empty where the file tells none.
   std::string projectionFile;  ///< The file that would tell it and is not there; empty for others.
 };
-FilePlace PlaceOf(const FileUse& use);
+FilePlace LocateFile(const FileUse& use);
 
 /// The grid of the model; nothing while its domain names no file that can be read.
 std::optional<GridGeometry> DomainGeometryOf(const CYbSEKvfBase& node);

@@ -96,7 +96,7 @@ SeriesFacts SumSteps(const DataItem& item, const TimeAxis& time, const std::vect
       facts.error = kCancelled;
       return facts;
     }
-    progress.Tell(static_cast<double>(step) / static_cast<double>(time.stamps.size()));
+    progress.Report(static_cast<double>(step) / static_cast<double>(time.stamps.size()));
     const bool isFirst = step == 0;
     const TimeSpan span{isFirst ? BeginOfFirstStep(time) : time.stamps[step - 1], time.stamps[step]};
     if (!isWanted(span)) continue;
@@ -127,7 +127,7 @@ SeriesFacts SumSteps(const DataItem& item, const TimeAxis& time, const std::vect
     else
       sums.Add(span, before, value);
   }
-  progress.Tell(1);
+  progress.Report(1);
   facts.sums = sums.Sums();
   facts.gaps = gaps.Take();
   return facts;

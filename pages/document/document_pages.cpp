@@ -26,13 +26,13 @@ namespace {
 /// cannot be read.
 std::optional<DataArea> ReadImagePlace(const std::string& path, Host& host) {
   if (!FileExists(path)) {
-    host.Tell("Can not open file", Host::Icon::Error);
+    host.ShowMessage("Can not open file", Host::Icon::Error);
     return std::nullopt;
   }
   kvfGetErrorGlb();  // what an earlier reader left
   KvfFile* file = kvfLoadFile(path, 0);
   if (kvfGetErrorGlb() != kKvfNoError) {
-    host.Tell(kvfErrorText() + "\n\nSyntax error in file name:\n" + path, Host::Icon::Error);
+    host.ShowMessage(kvfErrorText() + "\n\nSyntax error in file name:\n" + path, Host::Icon::Error);
     kvfClose(&file);
     return std::nullopt;
   }
@@ -43,7 +43,7 @@ std::optional<DataArea> ReadImagePlace(const std::string& path, Host& host) {
                       kvfGetParam(place, "x1", &area.x1, 1, 1) && kvfGetParam(place, "y1", &area.y1, 1, 1);
   kvfClose(&file);
   if (isRead) return area;
-  host.Tell(path + " tells no place: x0, y0, x1 and y1 were expected in World_Coordinates", Host::Icon::Error);
+  host.ShowMessage(path + " tells no place: x0, y0, x1 and y1 were expected in World_Coordinates", Host::Icon::Error);
   return std::nullopt;
 }
 
@@ -154,11 +154,11 @@ void CDisplayDlg::Import() {
     if (result.Ok())
       area = DataArea{box.xMin, box.yMin, box.xMax, box.yMax};
     else
-      Outside().Tell(result.error, Host::Icon::Error);
+      Outside().ShowMessage(result.error, Host::Icon::Error);
   } else if (extension == ".bmpw") {
     area = ReadImagePlace(*path, Outside());
   } else if (extension == ".shp") {
-    if (!FileExists(*path)) return Outside().Tell("Can not open shape file", Host::Icon::Error);
+    if (!FileExists(*path)) return Outside().ShowMessage("Can not open shape file", Host::Icon::Error);
     Host::ItemQuestion axis;
     axis.title = "Shape axis units";
     axis.file = *path;
@@ -172,7 +172,7 @@ void CDisplayDlg::Import() {
     shapes.SetAxisLengthUnit(units[static_cast<std::size_t>(*chosen)]);
     Envelope box;
     if (const FileResult result = shapes.ReadShapeFile(*path); !result.Ok() || !shapes.GetTranscribingRect(box))
-      Outside().Tell("Can not load shape file\n\n" + result.error, Host::Icon::Error);
+      Outside().ShowMessage("Can not load shape file\n\n" + result.error, Host::Icon::Error);
     else
       area = DataArea{box.xMin, box.yMin, box.xMax, box.yMax};
   }

@@ -172,7 +172,7 @@ void CPreprocessedNDS2_PLOT::ReadRiver() {
   if (const auto result = ReadProcessedRiver(ResolvedPath(document->PreprocessedRiverData(), {}), river);
       !result.Ok()) {
     riverProblem_ = result.message;
-    if (!Context().isReplacement) Outside().Tell(result.message, Host::Icon::Warning);
+    if (!Context().isReplacement) Outside().ShowMessage(result.message, Host::Icon::Warning);
     return;
   }
   if (river.firstLinks && river.secondLinks) links_.emplace(*river.firstLinks, *river.secondLinks);

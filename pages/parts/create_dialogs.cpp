@@ -124,7 +124,7 @@ void CData2DNdsCreateDlg::Describe(PageForm& form) {
   if (!isDomain_) form.Number("Fixed Value:", fixedValue_).Quantity(itemType_).EnabledWhen(isFixed);
   Control& text = form.File("Filename:", textFile_);
   text.Filter(kTextFilter).DefaultExtension("txt").EnabledWhen(isText).Then([this] {
-    if (const std::string problem = ImportText(); !problem.empty()) Outside().Tell(problem, Host::Icon::Error);
+    if (const std::string problem = ImportText(); !problem.empty()) Outside().ShowMessage(problem, Host::Icon::Error);
     return 0;
   });
   form.Number("Delete Value:", deleteValue_).ShownWhen(isText);
@@ -295,7 +295,7 @@ std::string CTvnCreate0DNdsDlg::CreateFile() {
         return WriteSeriesFile(path, series, progress);
       });
   if (problem.empty() && !notes.empty())
-    Outside().Tell(fmt::format("The file is made. {}", fmt::join(notes, "; ")), Host::Icon::Information);
+    Outside().ShowMessage(fmt::format("The file is made. {}", fmt::join(notes, "; ")), Host::Icon::Information);
   return problem;
 }
 

@@ -20,7 +20,7 @@ void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const Fi
 
 bool MayCreateFile(const PageContext& context) {
   if (!context.document.PathName().empty()) return true;
-  context.host.Tell("You must save your setup before you can create a file.", Host::Icon::Warning);
+  context.host.ShowMessage("You must save your setup before you can create a file.", Host::Icon::Warning);
   return false;
 }
 

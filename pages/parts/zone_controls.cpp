@@ -62,11 +62,11 @@ FoundZones FindWatched(Host& host, const ZoneFinder& finder) {
 /// changed.
 int SyncOrAsk(Host& host, const FoundZones& found, ZoneSource& source) {
   if (!found.unreadable.empty()) {
-    host.Tell(fmt::format("{}\n\nThe zones stay as they are.", found.unreadable), Host::Icon::Warning);
+    host.ShowMessage(fmt::format("{}\n\nThe zones stay as they are.", found.unreadable), Host::Icon::Warning);
     return kDataChanged;
   }
   if (!found.message.empty()) {
-    host.Tell(found.message, Host::Icon::Warning);
+    host.ShowMessage(found.message, Host::Icon::Warning);
     return kDataChanged;
   }
   if (const SyncPlan plan = source.PlanZones(found); !plan.editedRemoved.empty()) {

@@ -67,7 +67,7 @@ bool CCatchmentDlg::BrowseShape(Host& host, const Host::FileQuestion& asked) {
   if (!chosen) return false;
   std::string problem;
   if (!n.ChooseShapeFile(FileName::Picked(*path, folder), units[static_cast<std::size_t>(*chosen)], problem))
-    host.Tell("Can not load shape file\n\n" + problem, Host::Icon::Error);
+    host.ShowMessage("Can not load shape file\n\n" + problem, Host::Icon::Error);
   return true;
 }
 

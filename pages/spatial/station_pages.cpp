@@ -78,7 +78,7 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
   const auto is = [&n](int distribution) { return Is(n.DistributionType, distribution); };
   form.Choice("Spatial Distribution:", n.DistributionType).RevalidatesLater().Then([this] {
     if (Node().DistributionType == Node_::kFullyDistributed && Node().IsCorrectedForElevation())
-      Outside().Tell(
+      Outside().ShowMessage(
           fmt::format("Warning: Fully distributed {} cannot be corrected for elevation.", Node().Kind().correctable),
           Host::Icon::Warning);
     return 0;

@@ -77,7 +77,7 @@ QString PlaceText(double place, const std::optional<NumberAxis>& numbers) {
   return numbers->unit.empty() ? number : number + " " + ToQt(numbers->unit);
 }
 
-double PlaceOf(const CYbDateTime& time) { return static_cast<double>(time.SecondsSinceEpoch()); }
+double AxisCoordinate(const CYbDateTime& time) { return static_cast<double>(time.SecondsSinceEpoch()); }
 
 CYbDateTime DateAt(double place, double perPixel) {
   double step = 60;

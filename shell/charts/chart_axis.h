@@ -20,7 +20,7 @@ QString AxisTitle(const std::optional<NumberAxis>& numbers);
 /// What a user reads of a place on the axis: a date, or a number with its unit.
 QString PlaceText(double place, const std::optional<NumberAxis>& numbers);
 /// The place of a date, and the date of a place.
-double PlaceOf(const CYbDateTime& time);
+double AxisCoordinate(const CYbDateTime& time);
 /// `perPixel` is the time between two pixels, in seconds: a date that is picked tells no more than that.
 CYbDateTime DateAt(double place, double perPixel);
 

@@ -66,7 +66,7 @@ void ChartMarkers::Show(const std::vector<DateMarker>& markers, const std::vecto
     drawn.name->setClipAxisRect(charts_.front());
     drawn.name->setText(ToQt(marker.name));
     drawn_.push_back(drawn);
-    Place(drawn_.size() - 1, PlaceOf(marker.time));
+    Place(drawn_.size() - 1, AxisCoordinate(marker.time));
   }
   ApplyTheme();
 }
@@ -198,7 +198,7 @@ bool ChartMarkers::Move(const QMouseEvent& event) {
   }
   const QCPAxis& times = *charts_.front()->axis(QCPAxis::atBottom);
   const double inside = std::clamp(times.pixelToCoord(event.position().x()), times.range().lower, times.range().upper);
-  Place(*dragged_, PlaceOf(DateAt(inside, PerPixel())));
+  Place(*dragged_, AxisCoordinate(DateAt(inside, PerPixel())));
   chart_.replot(QCustomPlot::rpQueuedReplot);
   return true;
 }

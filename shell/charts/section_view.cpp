@@ -190,7 +190,7 @@ void SectionView::FitHeights() {
     heights.setRange(units_->height.Shown(range->first - 0.05 * size),
                      units_->height.Shown(range->second + 0.1 * size));
   }
-  TellExaggeration();
+  ShowExaggeration();
 }
 
 double SectionView::Exaggeration() const {
@@ -201,7 +201,7 @@ double SectionView::Exaggeration() const {
          metresPerPixel(*chart_->yAxis, units_->height, chart_->axisRect()->height());
 }
 
-void SectionView::TellExaggeration() {
+void SectionView::ShowExaggeration() {
   if (exaggeration_) return choice_->setItemText(0, tr("Fill"));
   const double times = Exaggeration();
   choice_->setItemText(0, tr("Fill (%1)").arg(QString::fromUtf8("%1 ×").arg(ToQt(FormatNumber(times, "%.2g")))));

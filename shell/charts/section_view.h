@@ -61,7 +61,7 @@ class SectionView : public PlotFrame {
   void ApplyTheme();
   void Arrange();
   void FitHeights();
-  void TellExaggeration();
+  void ShowExaggeration();
   void PointAt(const QMouseEvent* event);
   bool Press(int key);
 

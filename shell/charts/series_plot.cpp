@@ -42,9 +42,9 @@ std::size_t PlaceCount(const Series& series) {
 }
 
 /// On the horizontal axis; NaN where a value has no place.
-double PlaceOfValue(const Series& series, std::size_t number) {
+double ValueCoordinate(const Series& series, std::size_t number) {
   if (!series.positions.empty()) return series.positions[number];
-  return series.times[number].IsValid() ? PlaceOf(series.times[number]) : std::nan("");
+  return series.times[number].IsValid() ? AxisCoordinate(series.times[number]) : std::nan("");
 }
 
 QString ValueText(double value) { return std::isnan(value) ? QString() : ToQt(FormatNumber(value, "%.6g")); }
@@ -165,8 +165,8 @@ void SeriesPlot::BuildPanel(int panel) {
     period->setClipAxisRect(left.axisRect());
     over(period->topLeft);
     over(period->bottomRight);
-    period->topLeft->setCoords(PlaceOf(content_.period->first), 0);
-    period->bottomRight->setCoords(PlaceOf(content_.period->second), 1);
+    period->topLeft->setCoords(AxisCoordinate(content_.period->first), 0);
+    period->bottomRight->setCoords(AxisCoordinate(content_.period->second), 1);
     periods_.push_back(period);
   }
   auto* pointer = new QCPItemStraightLine(chart_);
@@ -187,7 +187,7 @@ void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) 
   const bool isLogarithmic = content_.numbers && content_.numbers->isLogarithmic;
   bool isSorted = true;
   for (std::size_t i = 0; i < count; ++i) {
-    const double time = PlaceOfValue(series, i);
+    const double time = ValueCoordinate(series, i);
     // A logarithmic axis has no place for what is not above 0.
     if (std::isnan(time) || (isLogarithmic && time <= 0)) continue;
     isSorted = isSorted && (points.isEmpty() || points.back().key <= time);
@@ -364,7 +364,7 @@ QString SeriesPlot::ValuesAsText() const {
     const Series& series = content_.series[i];
     text += "\t" + NameOf(series);
     for (std::size_t k = 0; k < std::min(PlaceCount(series), series.values.size()); ++k) {
-      const double place = PlaceOfValue(series, k);
+      const double place = ValueCoordinate(series, k);
       if (std::isnan(place)) continue;
       std::vector<QString>& row = rows[place];
       row.resize(content_.series.size());

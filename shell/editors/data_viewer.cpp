@@ -208,7 +208,7 @@ void DataViewer::Reload(bool always) {
   }
   QStringList notes;
   for (const std::string& note : file_.Notes()) notes << ToQt(note);
-  Tell(notes.join("\n"));
+  ShowNotes(notes.join("\n"));
   ShowItem();
 }
 
@@ -261,7 +261,7 @@ void DataViewer::ShowSlice() {
         MapContent map = file_.Map();
         map.picked = [this](const MapPick& pick) {
           if (!pick.cell) return;
-          const auto [row, column] = file_.PlaceOf(pick.cell->first, pick.cell->second);
+          const auto [row, column] = file_.TableCellOf(pick.cell->first, pick.cell->second);
           table_->GoTo(row, column);
         };
         if (map.awaited.empty()) table_->Refill();
@@ -273,10 +273,10 @@ void DataViewer::ShowSlice() {
 void DataViewer::GoToDate() {
   std::size_t step = 0;
   if (const std::string expected = file_.FindDate(FromQt(date_->text()), step); !expected.empty()) {
-    Tell(Translated(expected));
+    ShowNotes(Translated(expected));
     return;
   }
-  Tell({});
+  ShowNotes({});
   if (!file_.IsSeries()) return steps_->setValue(static_cast<int>(step));
   bool isMoved = false;
   const std::size_t row = file_.ShowRowOf(step, isMoved);
@@ -285,7 +285,7 @@ void DataViewer::GoToDate() {
   table_->GoTo(row, file_.ColumnOf(file_.Chosen().front()));
 }
 
-void DataViewer::Tell(const QString& text) {
+void DataViewer::ShowNotes(const QString& text) {
   told_->setText(text);
   told_->setVisible(!text.isEmpty());
 }

@@ -55,7 +55,7 @@ class DataViewer : public QWidget {
   /// After another step or layer was chosen.
   void ShowSlice();
   void GoToDate();
-  void Tell(const QString& text);
+  void ShowNotes(const QString& text);
 
   DataFileView file_;
   const DisplayUnits& units_;

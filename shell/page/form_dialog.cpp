@@ -31,7 +31,7 @@ void FormDialog::TryAccept() {
   view_->Commit();
   const std::string problem = accept_();
   if (problem.empty()) return accept();
-  if (problem != " ") form_.Outside().Tell(problem, Host::Icon::Warning);
+  if (problem != " ") form_.Outside().ShowMessage(problem, Host::Icon::Warning);
 }
 
 }  // namespace tervane

@@ -258,7 +258,7 @@ void TableView::Paste() {
   const CellRange cells = Selected().value_or(CellRange{});
   if (!text.isEmpty()) {
     const CellsResult result = page_.Paste(control_, cells, FromQt(text));
-    Tell(result, tr("Cells pasted: %1").arg(result.taken));
+    ShowResult(result, tr("Cells pasted: %1").arg(result.taken));
     if (result.taken > 0)
       view_->selectionModel()->select(
           QItemSelection(model_->index(result.cells.firstRow - 1, result.cells.firstColumn - 1),
@@ -271,17 +271,18 @@ void TableView::FillDown() {
   const auto cells = Selected();
   if (!cells) return;
   const CellsResult result = page_.FillDown(control_, *cells);
-  Tell(result, tr("Cells filled: %1").arg(result.taken));
+  ShowResult(result, tr("Cells filled: %1").arg(result.taken));
 }
 
 void TableView::ClearCells() {
-  if (const auto cells = Selected()) Tell(page_.ClearCells(control_, *cells), {});
+  if (const auto cells = Selected()) ShowResult(page_.ClearCells(control_, *cells), {});
 }
 
-void TableView::Tell(const CellsResult& result, const QString& done) {
+void TableView::ShowResult(const CellsResult& result, const QString& done) {
   message_->setText(done);
   if (result.refused == 0) return;
-  page_.Outside().Tell(FromQt(tr("These cells kept their values:")) + "\n\n" + result.Message(), Host::Icon::Warning);
+  page_.Outside().ShowMessage(FromQt(tr("These cells kept their values:")) + "\n\n" + result.Message(),
+                              Host::Icon::Warning);
 }
 
 bool TableView::GoOn(int key, Qt::KeyboardModifiers modifiers) {

@@ -60,7 +60,7 @@ class TableView : public QWidget {
   bool TakeKey(const QKeyEvent& keys);
   /// Opens the list or the calendar of the current cell.
   void OpenList();
-  void Tell(const CellsResult& result, const QString& done);
+  void ShowResult(const CellsResult& result, const QString& done);
   void SyncButtons();
   void FitColumns();
   void OfferUnits(int column, const QPoint& place);

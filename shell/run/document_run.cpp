@@ -53,7 +53,7 @@ void DocumentRun::Start(const CYbSimpleLaunch& launch, bool showsProgress) {
                                                       EnginePlaces::Here(host_.Setting(kEnginePathSetting)), problem);
   if (!request || !run.Start(*request, problem)) {
     AddToLog(tr("Not run: %1").arg(ToQt(problem)));
-    host_.Tell(problem, Host::Icon::Error);
+    host_.ShowMessage(problem, Host::Icon::Error);
     return;
   }
   AddToLog(tr("Run: %1").arg(ToQt(request->engine + " " + request->setup + " " + request->options).trimmed()));
@@ -99,7 +99,7 @@ void DocumentRun::Tick() {
   if (!news.messages.empty()) emit MessagesCame();
   if (news.outcome != RunOutcome::GoingOn) return End(news.outcome);
   emit Moved();
-  if (!news.trouble.empty()) host_.Tell(news.trouble, Host::Icon::Error);
+  if (!news.trouble.empty()) host_.ShowMessage(news.trouble, Host::Icon::Error);
 }
 
 void DocumentRun::End(RunOutcome outcome) {

@@ -143,7 +143,7 @@ void PlotFrame::Export() {
   plot_.picture(kPaperRatio).save(&buffer, "PNG");
   const FileResult result =
       WriteFileAtomically(*path, std::string_view(bytes.constData(), static_cast<std::size_t>(bytes.size())));
-  if (!result.Ok()) host_.Tell(result.error, Host::Icon::Error);
+  if (!result.Ok()) host_.ShowMessage(result.error, Host::Icon::Error);
 }
 
 }  // namespace tervane

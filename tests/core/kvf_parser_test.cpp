@@ -9,13 +9,13 @@
 
 #include "core/kvf_writer.h"
 #include "tests/core/parsed.h"
-#include "tests/support/sides.h"
+#include "tests/support/split_at_arrow.h"
 
 namespace tervane {
 namespace {
 
 using test::Parsed;
-using test::Sides;
+using test::SplitAtArrow;
 using testing::HasSubstr;
 using testing::StartsWith;
 
@@ -46,7 +46,7 @@ TEST(KvfParser, AValueHasItsTypeByItsForm) {
   };
   for (const Case& c : cases) {
     for (const char* form : c.forms) {
-      const auto [source, written] = Sides(form);
+      const auto [source, written] = SplitAtArrow(form);
       const Parsed parsed(WithValues(source));
       ASSERT_EQ(parsed.Message(), "") << form;
       const KvfParam* param = kvfParamByNum(kvfKeywordByNum(parsed.Target(), 1), 1);

@@ -11,7 +11,7 @@
 
 #include "platform/text.h"
 #include "tests/core/parsed.h"
-#include "tests/support/sides.h"
+#include "tests/support/split_at_arrow.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {
@@ -19,7 +19,7 @@ namespace {
 
 using test::Parsed;
 using test::ReadFile;
-using test::Sides;
+using test::SplitAtArrow;
 using test::TempFolder;
 using testing::ElementsAre;
 using testing::HasSubstr;
@@ -182,7 +182,7 @@ TEST(Kvf, ANumberIsTakenInAnotherFormWhereNothingIsLost) {
        {"6 => ifd", "6.0 => ifd", "6f => ifd", "6.5 => fd", "6.5f => fd", "inf => fd", "-inff => fd", "0.1 => fd",
         "0.1f => fd", "16777217 => id", "1e300 => d", "1e-50 => d", "0.123456789 => d", "-2147483648.0 => ifd",
         "2147483648.0 => fd", "2147483648f => fd", "true => ", "\"6\" => ", " => "}) {
-    const auto [source, takes] = Sides(row);
+    const auto [source, takes] = SplitAtArrow(row);
     SCOPED_TRACE(source);
     const Parsed parsed("target T {\nk = " + source + "\n}");
     const float single = std::strtof(source.c_str(), nullptr);

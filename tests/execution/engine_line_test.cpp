@@ -5,7 +5,7 @@
 #include <fmt/format.h>
 #include <gtest/gtest.h>
 
-#include "tests/support/sides.h"
+#include "tests/support/split_at_arrow.h"
 
 namespace tervane {
 namespace {
@@ -40,7 +40,7 @@ TEST(EngineLine, IsUnderstoodByItsForm) {
            "an error: none => text",
            " => text",
        }) {
-    const auto [line, expected] = test::Sides(row);
+    const auto [line, expected] = test::SplitAtArrow(row);
     EXPECT_EQ(Understood(line), expected) << row;
   }
 }

@@ -99,7 +99,7 @@ TEST(DataFileView, ShowsTheChosenStepAndLayerOfAGridTheNorthFirst) {
   EXPECT_EQ(view.CellsAsText(0, 2, 0, 3, false),
             "3108\t3109\t3110\t3111\n3104\t3105\t3106\t3107\n3100\t3101\t3102\t3103\n");
   EXPECT_EQ(view.RowHead(0), "2");
-  EXPECT_EQ(view.PlaceOf(1, 2), std::pair(std::size_t{0}, std::size_t{1}));
+  EXPECT_EQ(view.TableCellOf(1, 2), std::pair(std::size_t{0}, std::size_t{1}));
   EXPECT_EQ(view.TableText(), "Head [m]");
   feet.Choose(100180, 1003);
   EXPECT_EQ(view.TableText(), "Head [ft]");

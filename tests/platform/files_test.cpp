@@ -35,7 +35,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 
-void TellSkipped(const std::string& what) { std::cout << "skipped: needs " << what << '\n'; }
+void ReportSkipped(const std::string& what) { std::cout << "skipped: needs " << what << '\n'; }
 
 unsigned PermissionsOf(const std::string& path) {
   return static_cast<unsigned>(fs::symlink_status(path).permissions()) & 07777u;
@@ -58,7 +58,7 @@ void AsOrdinaryUser(const std::function<void()>& expect) {
   InChild([&] {
     constexpr unsigned kNobody = 65534;
     if (geteuid() == 0 && (setgroups(0, nullptr) != 0 || setgid(kNobody) != 0 || setuid(kNobody) != 0))
-      return TellSkipped("a user for whom permissions count");
+      return ReportSkipped("a user for whom permissions count");
     umask(022);
     expect();
   });
@@ -126,8 +126,8 @@ TEST_F(Files, OwnerGroupAndExtendedAttributesOfAnOldFileAreKept) {
   const bool isGiven = chown(path.c_str(), 1234, 4321) == 0;
   SetPermissions(path, 0660);
   EXPECT_EQ(WriteFileAtomically(path, "new").note, "");
-  if (!hasAttribute) TellSkipped("extended attributes");
-  if (!isGiven) TellSkipped("the right to give files away");
+  if (!hasAttribute) ReportSkipped("extended attributes");
+  if (!isGiven) ReportSkipped("the right to give files away");
   char value[16] = {};
   EXPECT_EQ(getxattr(path.c_str(), "user.origin", value, sizeof value), hasAttribute ? 6 : -1);
   EXPECT_STREQ(value, hasAttribute ? "survey" : "");
@@ -139,7 +139,7 @@ TEST_F(Files, OwnerGroupAndExtendedAttributesOfAnOldFileAreKept) {
 }
 
 TEST_F(Files, WhoMayNotGiveAFileAwayIsToldSoAndNobodyElseGetsAccess) {
-  if (geteuid() != 0) return TellSkipped("root, to make a file of another user");
+  if (geteuid() != 0) return ReportSkipped("root, to make a file of another user");
   folder.Write("x.tvd", "old");
   // Others may read and write, the group may do so too and execute: the new group must not get that.
   SetPermissions(path, 0776);
@@ -238,7 +238,7 @@ TEST_F(Files, AFullDiskLeavesTheOldFile) {
     // A file system of 64 KB of its own, which vanishes with the child.
     if (unshare(CLONE_NEWNS) != 0 || mount("none", "/", nullptr, MS_REC | MS_PRIVATE, nullptr) != 0 ||
         mount("tmpfs", folder.Path().c_str(), "tmpfs", 0, "size=64k") != 0)
-      return TellSkipped("the right to mount a file system");
+      return ReportSkipped("the right to mount a file system");
     std::string saved;
     FileResult result;
     for (std::string next(1000, 'a'); result.Ok() && next.size() < 100'000; next.append(1000, 'b'))

@@ -7,12 +7,12 @@
 #include <fmt/format.h>
 #include <gmock/gmock.h>
 
-#include "tests/support/sides.h"
+#include "tests/support/split_at_arrow.h"
 
 namespace tervane {
 namespace {
 
-using test::Sides;
+using test::SplitAtArrow;
 
 TEST(Paths, RootsOfEverySystemAreAbsolute) {
   for (const char* path : {"/", "/x", "\\x", "C:\\x", "c:/x", "C:", "C:x", "\\\\server\\share", "//server/share/x"})
@@ -25,7 +25,8 @@ using Way = std::string (*)(std::string_view path, std::string_view folder);
 
 /// Expects of each "path => way" the way from the folder to the path.
 void ExpectWays(Way way, const char* folder, std::initializer_list<const char*> rows) {
-  for (const char* row : rows) EXPECT_EQ(way(Sides(row).first, folder), Sides(row).second) << row << " in " << folder;
+  for (const char* row : rows)
+    EXPECT_EQ(way(SplitAtArrow(row).first, folder), SplitAtArrow(row).second) << row << " in " << folder;
 }
 
 TEST(Paths, AStoredNameIsResolvedAgainstItsFolder) {
@@ -67,7 +68,7 @@ TEST(Paths, APathIsTakenApart) {
                           "a\\x.v1.tvd => a|x.v1.tvd|x.v1|.tvd", "//x => /|x|x|", "C:\\x => C:\\|x|x|",
                           "C:x => C:|x|x|", "a.d/x => a.d|x|x|", "a//x => a|x|x|", "a/ => a|||", ".x => |.x|.x|",
                           ".x.tvd => |.x.tvd|.x|.tvd", "a/.. => a|..|..|", "x. => |x.|x|."}) {
-    const auto [path, parts] = Sides(row);
+    const auto [path, parts] = SplitAtArrow(row);
     EXPECT_EQ(fmt::format("{}|{}|{}|{}", FolderOf(path), FileNameOf(path), BaseNameOf(path), ExtensionOf(path)), parts);
   }
 }

@@ -12,12 +12,12 @@
 #include "simspec/basic_parameters.h"
 #include "simspec/control_parameters.h"
 #include "tests/simspec/test_setup.h"
-#include "tests/support/sides.h"
+#include "tests/support/split_at_arrow.h"
 
 namespace tervane {
 namespace {
 
-using test::Sides;
+using test::SplitAtArrow;
 using test::TestSetup;
 using testing::IsEmpty;
 
@@ -93,7 +93,7 @@ TEST(ModelComponents, TheyDecideWhichNodesTakePart) {
     c.choose(Choice(setup));
     std::string used;
     for (const char* node : nodes)
-      if (setup.IsUsed(Sides(node).second)) used += (used.empty() ? "" : " ") + Sides(node).first;
+      if (setup.IsUsed(SplitAtArrow(node).second)) used += (used.empty() ? "" : " ") + SplitAtArrow(node).first;
     EXPECT_EQ(used, c.used) << c.what;
     for (const char* always : {"FlowModelDocVersion", "ViewSettings", "CIntroductionKvf", "Overlays", "SimSpec",
                                "SimSpec/SimTitle", "ExtraParams", "ModelCompWQ/WQTSC", "SimSpec/SimulationPeriod"})

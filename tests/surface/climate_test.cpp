@@ -9,12 +9,12 @@
 #include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
 #include "tests/simspec/test_setup.h"
-#include "tests/support/sides.h"
+#include "tests/support/split_at_arrow.h"
 
 namespace tervane {
 namespace {
 
-using test::Sides;
+using test::SplitAtArrow;
 using test::TestSetup;
 
 /// Water quality that the climate asks: what decays, and what the templates take.
@@ -107,8 +107,8 @@ TEST(Climate, SwitchesAndComponentsDecideWhatTakesPart) {
     c.choose(choice);
     std::string used;
     for (const char* node : nodes)
-      if (choice.setup.At<CYbSEKvfBase>("Climate/" + Sides(node).second).IsDataUsedInSetup())
-        used += (used.empty() ? "" : " ") + Sides(node).first;
+      if (choice.setup.At<CYbSEKvfBase>("Climate/" + SplitAtArrow(node).second).IsDataUsedInSetup())
+        used += (used.empty() ? "" : " ") + SplitAtArrow(node).first;
     EXPECT_EQ(used, c.used) << c.what;
   }
 }
