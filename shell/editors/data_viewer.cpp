@@ -71,7 +71,7 @@ DataViewer::DataViewer(const std::string& path, Host& host, const DisplayUnits& 
     ShowSlice();
   });
   connect(date_, &QLineEdit::returnPressed, this, &DataViewer::GoToDate);
-  connect(table_, &DataTable::Told, this, &DataViewer::Tell);
+  connect(table_, &DataTable::Told, this, &DataViewer::ShowNotes);
   connect(&disk_, &QTimer::timeout, this, [this] { Reload(false); });
   connect(&Theme::Get(), &Theme::Changed, this, &DataViewer::FollowTheme);
   disk_.start(kDiskInterval);
