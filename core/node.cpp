@@ -17,6 +17,11 @@ namespace {
 
 std::atomic<std::uint64_t> nextSerial{1};
 
+/// Whether the document that is read holds the section under its old name.
+bool BearsOldName(const auto& oldSection, const CYbSEKvfGlobalBase* root) {
+  return !oldSection.name.empty() && (root ? root->ReadDocVersion() : -1) <= oldSection.lastVersion;
+}
+
 }  // namespace
 
 CYbSEKvfBase::CYbSEKvfBase(std::string title, std::string sectionName, CYbSEKvfBase* parent)
@@ -107,8 +112,7 @@ int CYbSEKvfBase::GetNumberWhatAmI() const {
 }
 
 KvfNode* CYbSEKvfBase::FindSection(KvfNode* parentSection) const {
-  const bool isOld = !oldSection_.name.empty() && (root_ ? root_->ReadDocVersion() : -1) <= oldSection_.lastVersion;
-  const std::string name = isOld ? std::string(oldSection_.name) : FormattedSectionName();
+  const std::string name = BearsOldName(oldSection_, root_) ? std::string(oldSection_.name) : FormattedSectionName();
   return kvfSectionByNameNum(parentSection, name, sectionInstance_);
 }
 
@@ -147,7 +151,7 @@ void CYbSEKvfBase::LoadChildren(KvfNode* section) {
   // By place, since a node that is read may give children to others.
   for (std::size_t place = 0; place < children_.size(); ++place) {
     CYbSEKvfBase& child = *children_[place];
-    const std::string& name = child.GetSectionName();
+    const std::string name(BearsOldName(child.oldSection_, root_) ? child.oldSection_.name : child.GetSectionName());
     const bool isNumbered = name.find("%d") != std::string::npos;
     // A child without a section in the file takes no place.
     if (!name.empty() && !isNumbered && child.GetSectionUsed()) child.sectionInstance_ = ++instances[name];

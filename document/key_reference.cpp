@@ -29,21 +29,10 @@ void Describe(CYbSEKvfBase& node, const std::string& parentPath, std::vector<Key
     if (const auto zone = zones->CreateStationItem()) Describe(*zone, path, sections);
 }
 
-/// The path with `%d` for the number that each step ends in: "A/Item_12/B" gives "A/Item_%d/B".
-std::string Numbered(std::string_view path) {
-  std::string result;
-  while (!path.empty()) {
-    const std::size_t end = std::min(path.find('/'), path.size());
-    const std::string_view step = path.substr(0, end);
-    const std::size_t digits = step.find_last_not_of("0123456789") + 1;
-    result += step.substr(0, digits);
-    if (digits < step.size()) result += "%d";
-    path.remove_prefix(end);
-    if (path.empty()) break;
-    result += '/';
-    path.remove_prefix(1);
-  }
-  return result;
+/// The name with `%d` for the number that it ends in: "Item_12" gives "Item_%d".
+std::string Numbered(const std::string& name) {
+  const std::size_t digits = name.find_last_not_of("0123456789") + 1;
+  return digits < name.size() ? name.substr(0, digits) + "%d" : name;
 }
 
 }  // namespace
@@ -55,9 +44,19 @@ KeyReference::KeyReference() {
   for (std::size_t i = 0; i < sections_.size(); ++i) byPath_.emplace(sections_[i].path, i);
 }
 
+std::string KeyReference::PathOfKind(std::string_view sectionPath) const {
+  std::string path;
+  for (const PathStep& step : ParseSetupPath(sectionPath).steps) {
+    // Like sections hold the same keys. A name may end in a number of its own.
+    std::string own = JoinPath(path, PathName(step.name));
+    path = byPath_.contains(own) ? std::move(own) : JoinPath(path, PathName(Numbered(step.name)));
+  }
+  return path;
+}
+
 const KeyInfo* KeyReference::Find(std::string_view sectionPath, std::string_view key) const {
   auto found = byPath_.find(std::string(sectionPath));
-  if (found == byPath_.end()) found = byPath_.find(Numbered(sectionPath));
+  if (found == byPath_.end()) found = byPath_.find(PathOfKind(sectionPath));
   if (found == byPath_.end()) return nullptr;
   for (const KeyInfo& info : sections_[found->second].keys)
     if (Trimmed(info.key) == key) return &info;

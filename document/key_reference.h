@@ -34,6 +34,8 @@ class KeyReference {
   std::string_view MeaningOf(std::string_view sectionPath, std::string_view key, std::string_view value) const;
 
  private:
+  /// The path of the kind of a section: "A/Item_12/B#2" gives "A/Item_%d/B".
+  std::string PathOfKind(std::string_view sectionPath) const;
   const KeyInfo* Find(std::string_view sectionPath, std::string_view key) const;
 
   std::vector<KeySection> sections_;

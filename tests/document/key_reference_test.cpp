@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "document/key_reference.h"
 
+#include <map>
+
 #include <fmt/format.h>
 #include <gmock/gmock.h>
 
@@ -47,6 +49,25 @@ section Climate {
     }
   }
   section POTEVAPTRANS {
+    section STATION_BASED {
+      NO_TIMESERIES = 1
+    }
+    section TIME_SERIES_1 {
+    }
+  }
+}
+section LandUse {
+  section Vegetation {
+    section GLOBAL {
+      section VEG_PROP_FILES {
+        YbSEKvfListItemCount = 1
+        section VegNo_1 {
+          section VEG_PROP_FILE {
+            VEGETATION = "Maize"
+          }
+        }
+      }
+    }
     section STATION_BASED {
       NO_TIMESERIES = 1
     }
@@ -103,11 +124,16 @@ bool IsDerived(const std::string& key) {
 }
 
 void CollectKeys(KvfSection& section, const std::string& path, std::vector<std::pair<std::string, KvfNode*>>& keys) {
-  for (KvfNode* node = section.firstChild; node; node = node->next)
-    if (node->IsKeyword())
+  std::map<std::string, int, std::less<>> instances;
+  for (KvfNode* node = section.firstChild; node; node = node->next) {
+    if (node->IsKeyword()) {
       keys.emplace_back(fmt::format("{}:{}", path, node->Name()), node);
-    else
-      CollectKeys(*AsSection(node), JoinPath(path, node->Name()), keys);
+      continue;
+    }
+    const int instance = ++instances[std::string(node->Name())];
+    const std::string step = instance == 1 ? std::string(node->Name()) : fmt::format("{}#{}", node->Name(), instance);
+    CollectKeys(*AsSection(node), JoinPath(path, step), keys);
+  }
 }
 
 TEST(KeyReference, EveryKeyOfEveryNodeIsReadBackAsItWasWritten) {
