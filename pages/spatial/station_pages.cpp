@@ -4,8 +4,8 @@
 
 #include <fmt/format.h>
 
-#include "pages/parts/create_dialogs.h"
 #include "pages/parts/plot_content.h"
+#include "pages/parts/series_controls.h"
 #include "pages/parts/zone_controls.h"
 #include "spatial/pages.h"
 #include "spatial/stations.h"
@@ -27,25 +27,9 @@ struct ValueOrSeries {
 void DescribeValueOrSeries(PageForm& form, CYbSEDlgBase& page, ValueOrSeries data, const Condition& isShown = {}) {
   const Condition isConstant = isShown && Is(data.type, 0), isSeries = isShown && Is(data.type, 1);
   form.Number("Value:", data.value).ShownWhen(isConstant);
-  CFMData0DFile& file = data.file;
-  form.DataFile("Time Series File:", file).Filter(kSeriesFileFilter).DefaultExtension("nds0").ShownWhen(isSeries);
-  form.Button("Edit...",
-              [&file, &page] {
-                if (page.Context().openDataFile) page.Context().openDataFile(file.File.Absolute());
-              })
-      .ShownWhen(isSeries);
-  form.Button("Create...",
-              [&page, &file, &value = data.value, items = data.itemTypes, kinds = data.valueTypes] {
-                if (!MayCreateFile(page.Context())) return;
-                CTvnCreate0DNdsDlg dialog(page.Context(), page.Node(), value, items, kinds);
-                if (const auto made = dialog.Run()) {
-                  file.Choose(*made);
-                  page.UpdateDoc(kDataChanged, "Create Time Series File");
-                }
-              })
-      .Beside()
-      .ShownWhen(isSeries);
-  form.Chart([&file] { return FileChart(file); }).ShownWhen(isSeries);
+  DescribeSeriesFile(form, page, "Time Series File:", data.file, {data.value, data.itemTypes, data.valueTypes},
+                     isSeries);
+  form.Chart([&file = data.file] { return FileChart(file); }).ShownWhen(isSeries);
 }
 
 constexpr ZoneSourceWords kStationWords{.grid = "Station Based Distribution File:",
