@@ -22,6 +22,7 @@
 #include "spatial/domain.h"
 #include "spatial/zones.h"
 #include "surface/climate.h"
+#include "surface/land_use.h"
 
 namespace tervane {
 
@@ -67,6 +68,7 @@ constexpr std::array kChildren{
     Child<CSubcatchmentKvf>(kSubcatchments),
     ChildRow{MakeBy<NewTopography>, kTopography.text},
     Child<CPrecipitationRelatedKvf>(kClimate),
+    Child<CLandUseKvf>(kLandUse),
     Child<CEvapotransKvf>(kOldEvapotranspiration),
     ChildRow{MakeBy<NewGroundwaterTable>, {}},
     Child<CExtraParamsKvf>(),

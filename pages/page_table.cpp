@@ -12,6 +12,8 @@
 #include "pages/spatial/station_pages.h"
 #include "pages/spatial/zone_pages.h"
 #include "pages/surface/climate_pages.h"
+#include "pages/surface/land_use_pages.h"
+#include "pages/surface/vegetation_pages.h"
 
 namespace tervane {
 
@@ -23,9 +25,10 @@ struct PageFile {
   std::span<const PageRow> (*rows)();
 };
 constexpr PageFile kFiles[] = {
-    {"document", DocumentPages}, {"simspec", ComponentsPages},  {"simspec", ControlPages}, {"simspec", PeriodPages},
-    {"spatial", Data2DPages},    {"spatial", DomainPages},      {"spatial", StationPages}, {"spatial", ZonePages},
-    {"surface", ClimatePages},   {"execution", ProcessedPages},
+    {"document", DocumentPages}, {"simspec", ComponentsPages}, {"simspec", ControlPages},
+    {"simspec", PeriodPages},    {"spatial", Data2DPages},     {"spatial", DomainPages},
+    {"spatial", StationPages},   {"spatial", ZonePages},       {"surface", ClimatePages},
+    {"surface", LandUsePages},   {"surface", VegetationPages}, {"execution", ProcessedPages},
 };
 
 std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, PageContext context) {

@@ -61,7 +61,7 @@ void StationOwnerKvf::NewStations() {
 }
 
 void StationOwnerKvf::ExchangeKeys(KeyExchange& keys) {
-  keys.FromOne("DistributionType", DistributionType).OneOf(kDistributions);
+  keys.FromOne("DistributionType", DistributionType).OneOf(Distributions());
 }
 
 std::shared_ptr<CFMSEKvfGroupBase> StationOwnerKvf::CreateFoundItem() {

@@ -65,6 +65,8 @@ class StationOwnerKvf : public CFMSEKvfBase {
 
  protected:
   void NewStations();
+  /// The choices of a distribution; a constant.
+  virtual KeyChoices Distributions() const { return kDistributions; }
   void ExchangeKeys(KeyExchange& keys) override;
 
  private:

@@ -16,5 +16,8 @@ inline constexpr PageClass kPotEvapTransStationPage{"CPotEvapTransTimeSeriesDlg"
 inline constexpr PageClass kAirTemperaturePage{"CSnowmeltDlg", 16538};
 inline constexpr PageClass kAirTemperatureStationPage{"CSnowmeltTimeSeriesDlg", 16540};
 inline constexpr PageClass kSnowMeltPage{"CSnowmeltConstDlg", 16605};
+inline constexpr PageClass kLandUsePage{"CLandUseDlg", 16512};
+inline constexpr PageClass kVegetationPage{"CVegetationDlg", 16641};
+inline constexpr PageClass kVegetationStationPage{"CVegetationTimeSeriesDlg", 16642};
 
 }  // namespace tervane

@@ -1,0 +1,97 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "surface/crop_list.h"
+
+#include <chrono>
+
+#include <fmt/format.h>
+
+#include "data/datafile_request.h"
+#include "simspec/periods.h"
+
+namespace tervane {
+
+namespace {
+
+const CYbDateTime kLastDate{9999, 12, 31};
+
+CYbDateTime Now() {
+  const auto now = std::chrono::system_clock::now().time_since_epoch();
+  return CYbDateTime::FromSecondsSinceEpoch(std::chrono::duration_cast<std::chrono::seconds>(now).count());
+}
+
+}  // namespace
+
+// ---- A crop
+
+CVegetationItemKvf::CVegetationItemKvf(const Condition& isUsed, CYbSEKvfBase* parent)
+    : CYbSEKvfBase("New vegetation", "VegNo_%d", parent), file_(NewChild<CTvnVegPropFile>()) {
+  const auto* period = Important(kSimulationPeriod);
+  StartDate = Midnight(period ? period->GetSimStartDate() : Now());
+  file_->UsedWhen(isUsed);
+}
+
+CYbDateTimeSpan CVegetationItemKvf::Length() const {
+  const CTvnVegPropStageDataList stages = file_->Stages();
+  return CYbDateTimeSpan::Days(stages.empty() ? 0 : stages.back().DayStamp());
+}
+
+CYbDateTime CVegetationItemKvf::GetEndDate() const {
+  if (!StartDate.IsValid()) return StartDate;
+  const CYbDateTime end = StartDate + Length();
+  return end.IsValid() ? end : kLastDate;
+}
+
+int CVegetationItemKvf::ValidateData() {
+  if (!file_->IsFileUsed()) return 1;
+  if (!StartDate.IsValid()) {
+    AddError("The start date is no date: the crop is passed over", "STARTDATE");
+    return 0;
+  }
+  const CTvnVegPropStageDataList stages = file_->Stages();
+  if (!stages.empty() && stages.back().DayStamp() == 0)
+    AddWarning("The crop has the length 0: it is never repeated", "STARTDATE");
+  const auto* sequence = dynamic_cast<const CVegetationListKvf*>(GetParent());
+  const auto* previous = sequence ? sequence->GetItem(sequence->GetNumberWhatIs(this) - 1) : nullptr;
+  if (previous && previous->StartDate.IsValid() && StartDate < previous->StartDate)
+    AddWarning("The crop begins before the one above it: crops are taken in the order of the list", "STARTDATE");
+  const auto* period = Important(kSimulationPeriod);
+  if (period && StartDate >= period->SIMEND)
+    AddFinding({Severity::Note, "The crop and all below it are not used: it does not begin before the simulation ends",
+                "STARTDATE", fmt::format("the simulation ends at {}", DateInWords(period->SIMEND))});
+  return 1;
+}
+
+void CVegetationItemKvf::ExchangeKeys(KeyExchange& keys) { keys.Day("STARTDATE", StartDate); }
+
+// ---- The sequence
+
+CVegetationListKvf::CVegetationListKvf(Condition isUsed, CYbSEKvfBase* parent)
+    : CYbSEKvfAbstractListBase("VegPropFile", "VEG_PROP_FILES", parent), isUsed_(std::move(isUsed)) {}
+
+std::unique_ptr<CVegetationItemKvf> CVegetationListKvf::NewItem() {
+  return std::make_unique<CVegetationItemKvf>(isUsed_, this);
+}
+
+CropCalendar CVegetationListKvf::BuildVegCalendar() const {
+  const auto* period = Important(kSimulationPeriod);
+  if (!period) return {};
+  std::vector<PlannedCrop> crops;
+  for (int number = 1; number <= GetItemCount(); ++number) {
+    const CVegetationItemKvf& item = *GetItem(number);
+    crops.push_back({&item.VegPropFile(), item.StartDate, item.Length(), item.Valid() != 0});
+  }
+  return tervane::BuildVegCalendar(crops, RecycleMode, period->SIMEND);
+}
+
+int CVegetationListKvf::ValidateData() {
+  if (isUsed_.Holds(*this) && BuildVegCalendar().isCut)
+    AddWarning(fmt::format("The calendar of crops has more than {} entries: what is behind them is left out",
+                           CropCalendar::kMostEntries),
+               "RecycleMode");
+  return 1;
+}
+
+void CVegetationListKvf::ExchangeKeys(KeyExchange& keys) { keys("RecycleMode", RecycleMode).OneOf(kRecycleModes); }
+
+}  // namespace tervane

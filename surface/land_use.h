@@ -1,0 +1,34 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What grows on the land, and whether and in which order it is irrigated.
+#pragma once
+
+#include "core/condition.h"
+#include "core/node.h"
+
+namespace tervane {
+
+/// How water is shared out among irrigated areas when there is too little.
+inline constexpr KeyChoice kPrioritySchemes[] = {{0, "None"}, {1, "Equal shortage"}, {2, "Equal volume"}};
+
+/// The use of the land. Flags are 0 or 1.
+class CLandUseKvf : public CYbSEKvfBase {
+ public:
+  explicit CLandUseKvf(CYbSEKvfBase* parent);
+
+  int Irrigation = 0;  ///< Kept while irrigation is not possible.
+  enum PriorityScheme : int { kNoPriorities = 0, kEqualShortage = 1, kEqualVolume = 2 };
+  int Priorities = kNoPriorities;
+
+  bool IsIrrigationPossible() const;
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override;
+};
+inline constexpr ImportantName<CLandUseKvf> kLandUse{"LANDUSE"};
+
+/// The setup could irrigate: what it is taken from and what it is wanted for is modelled.
+Condition IrrigationPossible();
+
+}  // namespace tervane
