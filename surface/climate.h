@@ -8,33 +8,11 @@
 #include <string>
 
 #include "platform/item_types.h"
+#include "simspec/water_quality_processes.h"
 #include "spatial/data2d.h"
 #include "spatial/stations.h"
 
 namespace tervane {
-
-// ---- What the climate asks of water quality. Where the tree has no such node, the answer is no.
-
-/// The list of decay processes, "DECAY_LIST".
-class DecayProcessList {
- public:
-  virtual ~DecayProcessList() = default;
-  /// Whether a process of the list depends on temperature.
-  virtual bool IsAnyTemperatureDependent() const = 0;
-};
-inline constexpr ImportantName<DecayProcessList> kDecayProcesses{"DECAY_LIST"};
-
-/// The process templates, "KINETRASPEC".
-class ProcessTemplates {
- public:
-  virtual ~ProcessTemplates() = default;
-  /// Whether a template in use takes that input from the setup.
-  virtual bool IsBuiltInUsed(int code) const = 0;
-
-  static constexpr int kAirTemperature = 2020;
-  static constexpr int kSolarRadiation = 2030;
-};
-inline constexpr ImportantName<ProcessTemplates> kProcessTemplates{"KINETRASPEC"};
 
 // ---- The forcings, found as what they are
 

@@ -1,0 +1,32 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What nodes that drive the model ask of water quality. Where the tree has no such node, the answer is no.
+#pragma once
+
+#include "core/node.h"
+
+namespace tervane {
+
+/// The list of decay processes, "DECAY_LIST".
+class DecayProcessList {
+ public:
+  virtual ~DecayProcessList() = default;
+  /// Whether a process of the list depends on temperature.
+  virtual bool IsAnyTemperatureDependent() const = 0;
+};
+inline constexpr ImportantName<DecayProcessList> kDecayProcesses{"DECAY_LIST"};
+
+/// The process templates, "KINETRASPEC".
+class ProcessTemplates {
+ public:
+  virtual ~ProcessTemplates() = default;
+  /// Whether a template in use takes that input from the setup.
+  virtual bool IsBuiltInUsed(int code) const = 0;
+
+  static constexpr int kAirTemperature = 2020;
+  static constexpr int kSolarRadiation = 2030;
+};
+inline constexpr ImportantName<ProcessTemplates> kProcessTemplates{"KINETRASPEC"};
+
+}  // namespace tervane
