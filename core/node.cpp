@@ -256,12 +256,21 @@ std::string_view NameOf(Severity severity) {
   return severity == Severity::Error ? "error" : severity == Severity::Warning ? "warning" : "note";
 }
 
+namespace {
+
+/// A node that judges its children is asked again by each of them, and tells nothing twice.
+void AddOnce(std::vector<Finding>& findings, Finding finding) {
+  if (std::ranges::find(findings, finding) == findings.end()) findings.push_back(std::move(finding));
+}
+
+}  // namespace
+
 void CYbSEKvfBase::AddError(std::string text, std::string key, std::string detail) {
-  findings_.push_back({Severity::Error, std::move(text), std::move(key), std::move(detail)});
+  AddOnce(findings_, {Severity::Error, std::move(text), std::move(key), std::move(detail)});
 }
 
 void CYbSEKvfBase::AddWarning(std::string text, std::string key, std::string detail) {
-  findings_.push_back({Severity::Warning, std::move(text), std::move(key), std::move(detail)});
+  AddOnce(findings_, {Severity::Warning, std::move(text), std::move(key), std::move(detail)});
 }
 
 // ---- Root
