@@ -23,6 +23,7 @@
 #include "spatial/zones.h"
 #include "surface/climate.h"
 #include "surface/land_use.h"
+#include "surface/overland.h"
 
 namespace tervane {
 
@@ -70,6 +71,8 @@ constexpr std::array kChildren{
     Child<CPrecipitationRelatedKvf>(kClimate),
     Child<CLandUseKvf>(kLandUse),
     Child<CEvapotransKvf>(kOldEvapotranspiration),
+    Child<COverlandKvf>(kOverland),
+    Child<CTopographicalRoutingKvf>(kOverlandZones),
     ChildRow{MakeBy<NewGroundwaterTable>, {}},
     Child<CExtraParamsKvf>(),
     Child<CExecuteEngineFlagsKvf>(kExecuteFlags),
@@ -81,13 +84,16 @@ constexpr std::array kChildren{
 // The reading order, in important names; a name that no node bears is passed over.
 
 /// Read behind all others, in this order: species must stand before everything that keeps a list per species.
-constexpr std::array<std::string_view, 3> kReadBehind{"SPECIES_LIST", "PROCESSESWQ", "Overland"};
+constexpr std::array<std::string_view, 3> kReadBehind{"SPECIES_LIST", "PROCESSESWQ", kOverland.text};
 /// Read behind those.
 constexpr std::string_view kUnsaturatedZone = "Unsatzone";
 /// Read at its place, which sizes its lists of layers, and once more when species and processes are known.
 constexpr std::string_view kSaturatedZone = "SATZONE";
 /// In files of version 1 read by the basic parameters, inside their section.
 constexpr std::string_view kStoringResults = "STORINGRESULTS";
+/// Setups of older versions keep the paved areas here, which now belong to overland flow.
+constexpr std::string_view kLandUseSection = "LandUse";
+constexpr int kFirstVersionOfPondedDrainage = 14;
 /// Read from old files and never written.
 constexpr std::string_view kRetired = kOldEvapotranspiration.text;
 
@@ -115,6 +121,9 @@ void CGlobal::Load(KvfNode* parentSection) {
   }
   for (const std::string_view name : kReadBehind)
     if (CYbSEKvfBase* node = GetImportantNode(name)) node->Load(target);
+  if (ReadDocVersion() < kFirstVersionOfPondedDrainage)
+    if (auto* overland = Important(kOverland))
+      overland->LoadPavedAreas(kvfSectionByNameNum(target, kLandUseSection, 1));
   if (CYbSEKvfBase* node = GetImportantNode(kUnsaturatedZone)) node->Load(target);
   if (CYbSEKvfBase* node = GetImportantNode(kSaturatedZone)) ReloadSaturatedZone(*node, target);
 

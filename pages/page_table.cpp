@@ -13,6 +13,7 @@
 #include "pages/spatial/zone_pages.h"
 #include "pages/surface/climate_pages.h"
 #include "pages/surface/land_use_pages.h"
+#include "pages/surface/overland_pages.h"
 #include "pages/surface/vegetation_pages.h"
 
 namespace tervane {
@@ -25,10 +26,11 @@ struct PageFile {
   std::span<const PageRow> (*rows)();
 };
 constexpr PageFile kFiles[] = {
-    {"document", DocumentPages}, {"simspec", ComponentsPages}, {"simspec", ControlPages},
-    {"simspec", PeriodPages},    {"spatial", Data2DPages},     {"spatial", DomainPages},
-    {"spatial", StationPages},   {"spatial", ZonePages},       {"surface", ClimatePages},
-    {"surface", LandUsePages},   {"surface", VegetationPages}, {"execution", ProcessedPages},
+    {"document", DocumentPages},   {"simspec", ComponentsPages}, {"simspec", ControlPages},
+    {"simspec", PeriodPages},      {"spatial", Data2DPages},     {"spatial", DomainPages},
+    {"spatial", StationPages},     {"spatial", ZonePages},       {"surface", ClimatePages},
+    {"surface", LandUsePages},     {"surface", VegetationPages}, {"surface", OverlandPages},
+    {"execution", ProcessedPages},
 };
 
 std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, PageContext context) {

@@ -20,4 +20,10 @@ inline constexpr PageClass kLandUsePage{"CLandUseDlg", 16512};
 inline constexpr PageClass kVegetationPage{"CVegetationDlg", 16641};
 inline constexpr PageClass kVegetationStationPage{"CVegetationTimeSeriesDlg", 16642};
 
+inline constexpr PageClass kOverlandPage{"COverlandDlg", 0};
+inline constexpr PageClass kPondedWaterExchangePage{"CPondedWaterExchangeDlg", 0};
+inline constexpr PageClass kPondedDrainagePage{"CPondedDrainageDlg", 0};
+inline constexpr PageClass kOverlandZonesPage{"CTopographicalRoutingDlg", 0};
+inline constexpr PageClass kOverlandZonePage{"CTopographicalRoutingPropDlg", 0};
+
 }  // namespace tervane

@@ -132,7 +132,8 @@ void DescribeZoneSource(PageForm& form, const CYbSEDlgBase& page, ZoneSource& so
       .Filter(words.shapeFilter)
       .DefaultExtension("shp")
       .ShownWhen(byPolygons)
-      .Then(sync);
+      .Then(sync)
+      .fileQuestion.title = words.shapeTitle;
   form.Shown("Item Name:", [&source] { return source.ShapeFile().Attribute(); }).ShownWhen(byPolygons);
   UnitKeyChoice(form, words.units, "ShapeAxisUnit", source.ShapeAxisUnit, quantity::kMapCoordinate)
       .ShownWhen(byPolygons);
@@ -177,10 +178,20 @@ void ZoneIdentity(PageForm& form, const std::string& zones, const CodedZoneProp&
   });
 }
 
+const CodedZonesKvf* ZonesOf(const CodedZoneProp& zone) { return dynamic_cast<const CodedZonesKvf*>(zone.GetParent()); }
+
+void PlaceOfZone(PageForm& form, const CodedZoneProp& zone) {
+  const CodedZonesKvf* zones = ZonesOf(zone);
+  form.Map([&zone, zones] { return ZoneMap(*zones, &zone); }).ShownWhen("the zones are distributed", [zones] {
+    return zones && zones->IsInForce();
+  });
+}
+
 void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words) {
   const auto sync = [&page, &zones] { return SyncWithSource(page.Outside(), zones); };
   if (zones.Kind().distribution) form.Choice("Spatial Distribution:", zones.DistributionType).Then(sync);
-  form.Choice("Data Type:", zones.Type).ShownWhen(zones.InForce()).Then(sync);
+  Control& type = form.Choice("Data Type:", zones.Type).Then(sync);
+  if (!words.isTypeAlwaysShown) type.ShownWhen(zones.InForce());
   DescribeZoneSource(form, page, zones, words);
   form.Map([&page, &zones] {
         MapContent map = ZoneMap(zones, nullptr);

@@ -20,8 +20,10 @@ struct ZoneSourceWords {
   const char* gridFilter = kGridFileFilter;
   const char* shape = "Shape Distribution File:";
   const char* shapeFilter = kShapeFileFilter;
+  const char* shapeTitle = "";  ///< Of the dialog in which a shape file is chosen; empty for the usual one.
   const char* units = "Units of X- and Y-axises:";
-  bool isEditBeside = true;  ///< The button stands beside the grid file; else it begins a row.
+  bool isEditBeside = true;        ///< The button stands beside the grid file; else it begins a row.
+  bool isTypeAlwaysShown = false;  ///< The kind of source is shown also where one zone serves the whole area.
 };
 
 /// The controls of the files of a source. The choice of the kind of source stands above them, told by the page.
@@ -43,6 +45,10 @@ void ZoneName(PageForm& form, const std::string& label, CodedZoneProp& zone);
 /// The code or the polygon that a zone stands for. `zones` is what the areas are called; without a source neither
 /// shows.
 void ZoneIdentity(PageForm& form, const std::string& zones, const CodedZoneProp& zone, const ZoneSource* source);
+/// The parent of a zone; null for one that stands elsewhere.
+const CodedZonesKvf* ZonesOf(const CodedZoneProp& zone);
+/// The map of all zones, this one standing out, where they are distributed.
+void PlaceOfZone(PageForm& form, const CodedZoneProp& zone);
 
 /// All controls of a parent of zones.
 void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words);

@@ -16,15 +16,12 @@ constexpr ZoneSourceWords kSubcatchmentWords{.gridFilter =
                                                  "UZ soil profile distr.files (*.nds2) |*.nds2|All Files (*.*) |*.*||"};
 
 void DescribeSubcatchment(PageForm& form, CSubcatchmentPropKvf& n) {
-  const auto* zones = dynamic_cast<const CodedZonesKvf*>(n.GetParent());
   ZoneName(form, "Name:", n);
-  ZoneIdentity(form, "zones", n, zones);
+  ZoneIdentity(form, "zones", n, ZonesOf(n));
   // A bool in the file.
   Control& links = form.Check("Use default river links", n.DefaultRiverLinks);
   links.Hint(kTreeRebuilt | kDataChanged);
-  form.Map([&n, zones] { return ZoneMap(*zones, &n); }).ShownWhen("the zones are distributed", [zones] {
-    return zones && zones->DistributionType == CodedZonesKvf::kDistributed;
-  });
+  PlaceOfZone(form, n);
 }
 
 void DescribeRiverLinks(PageForm& form, CSubcatchmentRiverlinksListKvf& n) {

@@ -40,6 +40,11 @@ section Subcatchments {
     }
   }
 }
+section OverlandSubcatchment {
+  NO_ZONES = 1
+  section TopographicalRouting {
+  }
+}
 section Climate {
   section PrecipitationRate {
     section STATION_BASED {
@@ -112,7 +117,7 @@ bool IsDerived(const std::string& key) {
   for (const char* derived :
        {"IsDataUsedInSetup", "FlowModelDocVersion:Version", "YbSEKvfListItemCount",
         // Counts 0 or 1 instead of 2 items, the others are then unread.
-        "ExtraParams:NoOfParams", "Subcatchments:NO_ZONES", "Riverlinks:Noofreaches", "NO_TIMESERIES", "ITEM_COUNT",
+        "ExtraParams:NoOfParams", ":NO_ZONES", "Riverlinks:Noofreaches", "NO_TIMESERIES", "ITEM_COUNT",
         // Of the zone's identity and place.
         ":GRIDCODE", "ProfileSecNumber",
         // A kind of value that the file's value has not.
