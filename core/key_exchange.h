@@ -49,6 +49,10 @@ class DeclaredKey {
   DeclaredKey& Unit(std::string_view text) {
     return AddFacts([&](KeyFacts& facts) { facts.unit = text; });
   }
+  /// For a key that no page shows.
+  DeclaredKey& Label(std::string_view text) {
+    return AddFacts([&](KeyFacts& facts) { facts.label = text; });
+  }
   DeclaredKey& Range(double least, double greatest) {
     return AddFacts([&](KeyFacts& facts) { facts.least = least, facts.greatest = greatest; });
   }

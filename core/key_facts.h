@@ -24,9 +24,10 @@ using KeyChoices = std::span<const KeyChoice>;
 std::string_view TextOf(KeyChoices choices, int value);
 
 struct KeyFacts {
-  KeyChoices choices = {};     ///< Empty for a key that may hold any value of its type.
-  int itemType = 0;            ///< The quantity whose base unit the file holds; 0 for none.
-  std::string_view unit = {};  ///< A fixed unit: "hours".
+  KeyChoices choices = {};      ///< Empty for a key that may hold any value of its type.
+  int itemType = 0;             ///< The quantity whose base unit the file holds; 0 for none.
+  std::string_view unit = {};   ///< A fixed unit: "hours".
+  std::string_view label = {};  ///< What people call it where no page has a control for it.
   double least = -std::numeric_limits<double>::infinity();
   double greatest = std::numeric_limits<double>::infinity();
 

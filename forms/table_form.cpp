@@ -13,6 +13,14 @@ namespace tervane {
 
 // ---- Columns and rows that are there
 
+void TableColumn::Bind(const BoundKeys::Place& place) {
+  key = place.key;
+  unit = place.facts.unit;
+  itemType = place.facts.itemType;
+  for (const KeyChoice& choice : place.facts.choices)
+    if (choice.isOffered) choices.emplace_back(choice.value, std::string(choice.text));
+}
+
 TableColumn& TableForm::AddColumn(std::string head) {
   TableColumn& column = columns_.emplace_back();
   column.head = std::move(head);

@@ -44,6 +44,7 @@ struct CellsResult {
 /// A column: what its cells show and take, by the number of the row, which is there.
 struct TableColumn {
   std::string head;
+  std::string key;  ///< Of the rows; empty where a column shows no key, or another one in each row.
   int width = 100;
   int headSpan = 1;                 ///< Over how many columns the head goes, this one included.
   std::string toolTip;              ///< Of the head, and of the cells that have none of their own.
@@ -70,6 +71,8 @@ struct TableColumn {
   std::function<void()> forget;
 
   bool IsButton() const { return kind == CellKind::Button; }
+  /// Takes over what the declaration of the key tells.
+  void Bind(const BoundKeys::Place& place);
 };
 
 /// A table: one row for each item of a list or each of some values. Inserting, deleting and moving rows come with it.

@@ -48,6 +48,11 @@ class ColumnOf {
     if (control_) control_->Unit(unit);
     return column_.unit = std::move(unit), *this;
   }
+  /// The key of the rows that a column over functions shows; a column over a member knows it.
+  ColumnOf& Key(std::string key) {
+    if (control_) control_->Key(key);
+    return column_.key = std::move(key), *this;
+  }
   ColumnOf& Format(std::string format) { return column_.format = std::move(format), *this; }
   ColumnOf& Hint(int hint) {
     if (control_) control_->Hint(hint);
@@ -92,8 +97,9 @@ class ColumnOf {
 };
 
 /// What makes columns over rows of one class. `get` is a member of the rows, `&Link::Chainage`, or gives a value or a
-/// reference to one. A reference to what is no constant can be changed; so can what has a `set`, which takes the row
-/// and the value, and gives nothing, or why the value is refused.
+/// reference to one. Of a member of nodes the declaration of its key tells quantity, unit and choices. A reference to
+/// what is no constant can be changed; so can what has a `set`, which takes the row and the value, and gives nothing,
+/// or why the value is refused.
 template <class Row>
 class ColumnMaker {
  public:
@@ -114,6 +120,11 @@ class ColumnMaker {
   ColumnOf<Row> Check(std::string head, Get get) {
     return Make(std::move(head), CellKind::Check,
                 [get](Row& row) { return CellPlace(CheckOf{&std::invoke(get, row)}); });
+  }
+  /// A member with the choices that its key's declaration offers.
+  template <class Get>
+  ColumnOf<Row> Choice(std::string head, Get get) {
+    return Make(std::move(head), CellKind::Choice, std::move(get));
   }
   /// An int or a text of a list: `{"Float", "Integer"}` for the numbers from 0 on, `{{3, "Fixed"}, {7, "Free"}}` for
   /// other values, or what gives the `CellChoices` of a row.
@@ -186,6 +197,7 @@ class ColumnMaker {
   ColumnOf<Row> Make(std::string head, std::optional<CellKind> kind, Get get) {
     using Result = std::invoke_result_t<const Get&, Row&>;
     TableColumn& column = Add(std::move(head), kind);
+    if constexpr (std::is_member_object_pointer_v<Get> && std::derived_from<Row, CYbSEKvfBase>) BindTo(get);
     column.get = GetterOf(get);
     if constexpr (kIsPlace<Got<Get>>)
       column.set = [rows = Rows(), get](int row, const CellValue& value) {
@@ -222,6 +234,18 @@ class ColumnMaker {
     return {column, Rows(), control_};
   }
 
+  template <class Member>
+  void BindTo(Member member) {
+    const std::unique_ptr<Row> sample = Rows()->Sample();
+    if (!sample) return;
+    BoundKeys keys;
+    keys.Add(*sample);
+    const BoundKeys::Place* place = keys.Find(&std::invoke(member, *sample));
+    if (!place) return;
+    made_->Bind(*place);
+    if (control_) control_->Key(place->key).Quantity(place->facts.itemType).Unit(std::string(place->facts.unit));
+  }
+
   template <class Get>
   std::function<CellValue(int)> GetterOf(Get get) const {
     return [rows = Rows(), get = std::move(get)](int row) -> CellValue {
@@ -236,6 +260,7 @@ class ColumnMaker {
 
   template <class Entries>
   void SetChoices(Entries entries) {
+    made_->choices.clear();
     if constexpr (std::invocable<const Entries&, Row&>)
       made_->rowChoices = [rows = Rows(), entries = std::move(entries)](int row) -> CellChoices {
         return std::invoke(entries, rows->At(row));

@@ -5,6 +5,7 @@
 #pragma once
 
 #include <concepts>
+#include <memory>
 #include <utility>
 #include <vector>
 
@@ -39,6 +40,9 @@ class RowsOf : public TableRows {
  public:
   /// A row that is there.
   virtual Row& At(int row) const = 0;
+  /// A row of no table, which stands for all: what its class declares of its keys is known where there are no rows.
+  /// Null where rows declare nothing.
+  virtual std::unique_ptr<Row> Sample() const { return nullptr; }
 };
 
 /// The items of a list node.
@@ -51,6 +55,7 @@ class ListRows : public RowsOf<Item> {
   Item& At(int row) const override { return *list_.GetItem(row); }
   const void* Identity(int row) const override { return list_.GetItemNode(row); }
   const CYbSEKvfBase* Node(int row) const override { return list_.GetItemNode(row); }
+  std::unique_ptr<Item> Sample() const override { return list_.NewItem(); }
   bool CanChange() const override { return true; }
   void Add() override { list_.AddItemNode(); }
   void Insert(int row) override { list_.InsertItem(row, 1); }

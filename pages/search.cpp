@@ -40,6 +40,7 @@ class PageTexts {
     if (!control.table) return;
     for (const TableColumn& column : control.table->Columns()) {
       Add(SearchHit::Kind::Label, column.head, {}, control.label);
+      Add(SearchHit::Kind::Key, column.key, {}, control.label);
       for (const CellChoice& choice : column.choices) Add(SearchHit::Kind::Option, choice.text, {}, control.label);
     }
   }

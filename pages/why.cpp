@@ -41,11 +41,11 @@ class Labels {
       labels_.push_back({control.node, control.key, label});
     });
   }
-  /// Empty for a choice that has no label; the key where no control has it.
-  std::string Find(const CYbSEKvfBase& node, const std::string& key) const {
+  /// Empty for a choice that has no label; nothing where no control has the key.
+  std::optional<std::string> Find(const BoundKeys::Place& place) const {
     for (const auto& known : labels_)
-      if (known.node == &node && known.key == key) return Replaced(known.label, "\n", " ");
-    return key;
+      if (known.node == place.node && known.key == place.key) return Replaced(known.label, "\n", " ");
+    return std::nullopt;
   }
 
  private:
@@ -91,8 +91,9 @@ class Explainer {
     reason.path = PathOf(*place->node);
     reason.key = place->key;
     CYbSEKvfBase* shown = PageNodeOf(*place->node, reason);
-    const std::string label = shown ? LabelOf(*shown, *place->node, place->key) : place->key;
-    reason.text = Demand(label, fact, place->facts);
+    std::optional<std::string> label = shown ? LabelOf(*shown, *place) : std::nullopt;
+    if (!label) label = place->facts.label.empty() ? place->key : std::string(place->facts.label);
+    reason.text = Demand(*label, fact, place->facts);
     return reason;
   }
 
@@ -123,14 +124,14 @@ class Explainer {
     return nullptr;
   }
 
-  std::string LabelOf(CYbSEKvfBase& shown, const CYbSEKvfBase& node, const std::string& key) {
+  std::optional<std::string> LabelOf(CYbSEKvfBase& shown, const BoundKeys::Place& place) {
     auto found = labels_.find(&shown);
     if (found == labels_.end()) {
       found = labels_.emplace(&shown, Labels()).first;
       const auto page = MakePageToRead(*PageClassOf(shown), shown, {document_, host_, {}});
       if (page) found->second.Look(page->Form());
     }
-    return found->second.Find(node, key);
+    return found->second.Find(place);
   }
 
   CYbSEDocument& document_;

@@ -8,7 +8,7 @@ namespace tervane {
 
 void CExtraParamsItemKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Name", Name);
-  keys("Type", Type);
+  keys("Type", Type).OneOf(kKinds);
   const auto exchangeValue = [&](int kind) {
     switch (kind) {
       case kFloat:

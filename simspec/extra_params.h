@@ -15,6 +15,8 @@ class CExtraParamsItemKvf : public CTvnKvfBase {
   explicit CExtraParamsItemKvf(CYbSEKvfBase* parent) : CTvnKvfBase("ExtraParam", "ExtraParam_%d", parent) {}
 
   enum Kind : int { kFloat = 0, kInteger = 1, kBool = 2, kText = 3, kFilename = 4 };
+  static constexpr KeyChoice kKinds[] = {
+      {kFloat, "Float"}, {kInteger, "Integer"}, {kBool, "Bool"}, {kText, "Text"}, {kFilename, "Filename"}};
 
   std::string Name;
   int Type = kFloat;

@@ -50,7 +50,7 @@ void CModelCompKvf::ExchangeKeys(KeyExchange& keys) {
   keys("OL", OL);
   keys("SZ", SZ);
   keys("UZ", UZ);
-  keys("WM", WM);
+  keys("WM", WM).Label("Water Movement (WM)");
   keys("River", River);
   keys("WQ", WQ);
   keys("ADPTRadio", ADPTRadio).OneOf(kWaterQualityMethods);

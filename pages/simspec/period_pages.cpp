@@ -136,7 +136,7 @@ void DescribeExtraParams(PageForm& form, CExtraParamsKvf& n) {
   auto table = std::make_shared<TableOf<Item>>(n);
   table->ItemName("Parameter");
   table->Value("Name", &Item::Name).Width(220);
-  table->Choice("Type", &Item::Type, {"Float", "Integer", "Bool", "Text", "Filename"});
+  table->Choice("Type", &Item::Type);
   // The cell follows the row's type; each type has a value of its own.
   table
       ->Value("Value",
@@ -156,6 +156,7 @@ void DescribeExtraParams(PageForm& form, CExtraParamsKvf& n) {
                     return NoCell{"a type of the list must be chosen first"};
                 }
               })
+      .Key("Value")
       .Width(260);
   form.Table(std::move(table));
 }

@@ -29,8 +29,8 @@ void DescribeRiverLinks(PageForm& form, CSubcatchmentRiverlinksListKvf& n) {
   auto table = std::make_shared<TableOf<Item>>(n);
   table->ItemName("River Link");
   table->Value("Branch name", &Item::Branchname).Width(220);
-  table->Value("Upstream", &Item::Upstream).Width(120).Quantity(quantity::kChainage).Format("%.6g");
-  table->Value("Downstream", &Item::Downstream).Width(120).Quantity(quantity::kChainage).Format("%.6g");
+  table->Value("Upstream", &Item::Upstream).Width(120).Format("%.6g");
+  table->Value("Downstream", &Item::Downstream).Width(120).Format("%.6g");
   form.Table(std::move(table));
 }
 

@@ -68,7 +68,7 @@ TEST(PageTable, EveryControlOverAValueOfTheSetupKnowsItsKey) {
   CFlowModelDoc document;
   ASSERT_TRUE(document.OpenText(FullSetup(), "/data/a.tvd"));
   test::ScriptedHost host;
-  int known = 0;
+  int known = 0, columns = 0;
   WalkNodes(document.Root(), [&](const NodePlace& place) {
     const PageClass* pageClass = place.node.GetDlgRuntimeClass(kSetupDataTree);
     if (!pageClass) return;
@@ -79,8 +79,17 @@ TEST(PageTable, EveryControlOverAValueOfTheSetupKnowsItsKey) {
       EXPECT_NE(control.key, "") << place.path << ": " << control.label;
       ++known;
     });
+    page->Form().ForEach([&](const Control& control) {
+      if (!control.table || control.table->IsShownOnly()) return;
+      for (const TableColumn& column : control.table->Columns()) {
+        if (!column.set) continue;
+        EXPECT_NE(column.key, "") << place.path << ": column " << column.head;
+        ++columns;
+      }
+    });
   });
   EXPECT_GT(known, 200);
+  EXPECT_GE(columns, 3);
 }
 
 TEST(PageTable, ShowingAPageChangesNothing) {

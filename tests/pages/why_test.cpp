@@ -39,7 +39,7 @@ TEST(Why, ANodeTakesPartIsToldInTheWordsOfThePages) {
       {"",
        "SimSpec/CompControlParaOL",
        true,
-       {"Numeric Engine is Tervane", "WM is on", "Overland Flow (OL) is on",
+       {"Numeric Engine is Tervane", "Water Movement (WM) is on", "Overland Flow (OL) is on",
         "The method of Overland Flow (OL) is Finite Difference"}},
       {"section SimSpec {\nModelType = 2\n}", "SimSpec/CompControlParaOL", false, {"Numeric Engine must be Tervane"}},
       {"section SimSpec {\nsection ModelComp {\nOL = 0\n}\n}",
