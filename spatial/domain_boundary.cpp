@@ -2,8 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "spatial/domain_boundary.h"
 
+#include <algorithm>
 #include <array>
 #include <cmath>
+#include <numeric>
 
 namespace tervane {
 
@@ -117,6 +119,18 @@ int CGeoDataBoundCondCatchmentData::GetBoundaryIndex(GridCell cell) const {
   if (BoundaryIndex.empty()) return -1;
   const bool isOnGrid = cell.i >= 0 && cell.j >= 0 && cell.i < Geometry().nx && cell.j < Geometry().ny;
   return isOnGrid ? BoundaryIndex[IndexOf(cell)] : 0;
+}
+
+std::vector<std::size_t> CGeoDataBoundCondCatchmentData::BoundaryOrder(const std::vector<BoundaryItem>& items) const {
+  std::vector<std::size_t> order(items.size());
+  std::iota(order.begin(), order.end(), std::size_t{0});
+  if (BoundaryIndex.empty() || !std::ranges::all_of(items, [](const BoundaryItem& item) { return item.point.has_value(); }))
+    return order;
+  std::vector<int> places;
+  for (const BoundaryItem& item : items)
+    places.push_back(GetBoundaryIndex(NearestBoundaryCell(item.point->x, item.point->y)));
+  std::ranges::stable_sort(order, {}, [&](std::size_t item) { return places[item]; });
+  return order;
 }
 
 void CGeoDataBoundCondCatchmentData::Paint(const std::vector<BoundaryItem>& items, bool byNumber) {

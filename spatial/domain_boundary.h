@@ -40,6 +40,10 @@ class CGeoDataBoundCondCatchmentData : public CTvn2DOrthoRotatedGridData {
   /// The place of a cell in the boundary, 0 off it; -1 before the boundary was traced.
   int GetBoundaryIndex(GridCell cell) const;
 
+  /// The places of the items in the order in which their points follow each other along the boundary. As they are given
+  /// before the boundary was traced, and while a point is missing.
+  std::vector<std::size_t> BoundaryOrder(const std::vector<BoundaryItem>& items) const;
+
   /// Makes a picture of the conditions: each stretch of the boundary has its type, or the number of its condition.
   void PaintBoundaryTypes(const std::vector<BoundaryItem>& items) { Paint(items, false); }
   void PaintBoundaryNumbers(const std::vector<BoundaryItem>& items) { Paint(items, true); }

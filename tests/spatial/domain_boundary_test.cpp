@@ -73,5 +73,20 @@ TEST(DomainBoundary, EachConditionRunsFromItsPointToTheNextOne) {
   EXPECT_EQ(domain.Value(2, 1), -1);
 }
 
+TEST(DomainBoundary, ConditionsAreBroughtIntoTheOrderOfTheBoundary) {
+  CGeoDataBoundCondCatchmentData domain = Domain({".2.", "212", ".2."});
+  const BoundaryItem north{MapPoint{1.5, 3}, 1}, east{MapPoint{3, 1.5}, 2}, alsoEast{MapPoint{2.9, 1.4}, 3},
+      west{MapPoint{0, 1.5}, 4}, unplaced{std::nullopt, 5};
+  using Order = std::vector<std::size_t>;
+  EXPECT_EQ(domain.BoundaryOrder({west, north}), (Order{0, 1})) << "nothing is known before the boundary is traced";
+  std::string message;
+  ASSERT_EQ(domain.PrepareBoundary(message), 1);
+  const struct {
+    std::vector<BoundaryItem> items;
+    Order order;
+  } cases[] = {{{west, alsoEast, north, east}, {2, 1, 3, 0}}, {{west, unplaced, north}, {0, 1, 2}}, {{}, {}}};
+  for (const auto& c : cases) EXPECT_EQ(domain.BoundaryOrder(c.items), c.order);
+}
+
 }  // namespace
 }  // namespace tervane
