@@ -94,10 +94,9 @@ PageContext WithoutDocument(PageContext context) {
 
 // ---- Grids
 
-CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, const CYbSEKvfBase& node, float value,
-                                         float deleteValue, int itemType, bool isDomain)
-    : CYbSEDlgBase(values_, WithoutDocument(context)),
-      forNode_(node),
+CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, CYbSEKvfBase& node, float value, float deleteValue,
+                                         int itemType, bool isDomain)
+    : CYbSEDlgBase(node, WithoutDocument(context)),
       isDomain_(isDomain),
       itemType_(itemType),
       fixedValue_(value),
@@ -106,11 +105,10 @@ CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, const CYbSE
   if (const auto* domain = node.Important(kDomain)) geometry_ = domain->GetModelGeometry();
 }
 
-CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, float value, const CYbSEKvfBase& node,
-                                         int itemType)
+CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, float value, CYbSEKvfBase& node, int itemType)
     : CData2DNdsCreateDlg(context, node, value, kUsualDeleteValue, itemType, false) {}
 
-CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, const CYbSEKvfBase& node)
+CData2DNdsCreateDlg::CData2DNdsCreateDlg(const PageContext& context, CYbSEKvfBase& node)
     : CData2DNdsCreateDlg(context, node, -1.0F, -1.0F, quantity::kCode, true) {}
 
 std::optional<FileName> CData2DNdsCreateDlg::Run() {
@@ -141,16 +139,18 @@ void CData2DNdsCreateDlg::Describe(PageForm& form) {
   BrowseToSave(file, gridFile_, Context().document.Root().SetupFolder());
 }
 
+int CData2DNdsCreateDlg::ValueUnit() const {
+  const ItemType* type = FindItemType(itemType_);
+  if (!type || itemType_ == quantity::kUndefined) return 0;
+  return Context().displayUnits && !isDomain_ ? Context().displayUnits->UnitKey(itemType_) : BaseUnit(*type).key;
+}
+
 std::string CData2DNdsCreateDlg::ImportText() {
   imported_ = nullptr;
-  const ItemType* type = FindItemType(itemType_);
-  const int unit = type && Context().displayUnits ? Context().displayUnits->UnitKey(itemType_)
-                   : type                         ? BaseUnit(*type).key
-                                                  : 0;
   const auto reading = std::make_shared<Computed<ImportedGrid>>(
       fmt::format("Reading {}", FileNameOf(textFile_.Absolute())),
-      [path = textFile_.Absolute(), geometry = geometry_, deleteValue = deleteValue_, unit, itemType = itemType_](
-          ImportedGrid& read, ProgressPart progress) {
+      [path = textFile_.Absolute(), geometry = geometry_, deleteValue = deleteValue_, unit = ValueUnit(),
+       itemType = itemType_](ImportedGrid& read, ProgressPart progress) {
         FileResult result = read.grid.ReadTextFile(path, geometry, deleteValue, unit, itemType, progress);
         read.note = result.note;
         return result;
@@ -163,9 +163,12 @@ std::string CData2DNdsCreateDlg::ImportText() {
 }
 
 std::function<std::string(CTvn2DOrthoRotatedGridData&)> CData2DNdsCreateDlg::GridMaker() const {
+  const int unit = ValueUnit();
   const ItemType* type = FindItemType(itemType_);
-  const int unit = type && itemType_ != quantity::kUndefined ? BaseUnit(*type).key : 0;
-  return [geometry = geometry_, value = fixedValue_, deleteValue = deleteValue_, unit, itemType = itemType_,
+  const float value =
+      unit == 0 ? fixedValue_
+                : static_cast<float>(Convert(static_cast<double>(fixedValue_), BaseUnit(*type), *FindUnit(unit)));
+  return [geometry = geometry_, value, deleteValue = deleteValue_, unit, itemType = itemType_,
           isDomain = isDomain_](CTvn2DOrthoRotatedGridData& grid) {
     if (!isDomain) return grid.SetGridData(geometry, value, deleteValue, unit, itemType);
     std::string problem = grid.SetGridData(geometry, 1.0F, deleteValue, unit, itemType);
@@ -181,7 +184,7 @@ std::string CData2DNdsCreateDlg::CreateFile() {
   if (!MayReplace(gridFile_, Outside())) return kStay;
   return Write(gridFile_, Outside(),
                [make = GridMaker(), imported = contents_ == kTextFile ? imported_ : nullptr, deleteValue = deleteValue_,
-                name = forNode_.GetTitle()](const std::string& path, ProgressPart progress) {
+                name = Node().GetTitle()](const std::string& path, ProgressPart progress) {
                  CTvn2DOrthoRotatedGridData grid;
                  if (imported)
                    grid = imported->grid;
@@ -195,8 +198,8 @@ std::string CData2DNdsCreateDlg::CreateFile() {
 
 // ---- Shapes
 
-CData2DShpCreateDlg::CData2DShpCreateDlg(const PageContext& context, const std::string& baseName)
-    : CYbSEDlgBase(values_, WithoutDocument(context)), file_(NewFile(context, baseName, "shp")) {}
+CData2DShpCreateDlg::CData2DShpCreateDlg(const PageContext& context, CYbSEKvfBase& node, const std::string& baseName)
+    : CYbSEDlgBase(node, WithoutDocument(context)), file_(NewFile(context, baseName, "shp")) {}
 
 std::optional<FileName> CData2DShpCreateDlg::Run() {
   if (!MayCreateFile(Context())) return std::nullopt;
@@ -218,10 +221,9 @@ std::string CData2DShpCreateDlg::CreateFile() {
 
 // ---- Series
 
-CTvnCreate0DNdsDlg::CTvnCreate0DNdsDlg(const PageContext& context, const CYbSEKvfBase& node, float value,
+CTvnCreate0DNdsDlg::CTvnCreate0DNdsDlg(const PageContext& context, CYbSEKvfBase& node, float value,
                                        std::vector<int> itemTypes, std::vector<int> valueTypes)
-    : CYbSEDlgBase(values_, WithoutDocument(context)),
-      forNode_(node),
+    : CYbSEDlgBase(node, WithoutDocument(context)),
       itemTypes_(std::move(itemTypes)),
       valueTypes_(valueTypes.empty() ? std::vector{0, 1, 2, 3} : std::move(valueTypes)),
       value_(static_cast<double>(value)),
@@ -266,7 +268,7 @@ std::string CTvnCreate0DNdsDlg::CreateFile() {
   constexpr std::size_t kMostSteps = 50'000'000;
   NewSeries series;
   std::vector<std::string> notes;
-  series.name = forNode_.GetTitle();
+  series.name = Node().GetTitle();
   series.itemType = itemTypes_[static_cast<std::size_t>(itemType_)];
   series.valueType = valueTypes_[static_cast<std::size_t>(valueType_)];
   if (!Trimmed(rows_).empty()) {

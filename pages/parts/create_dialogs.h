@@ -1,8 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// Dialogs that make a first data file from inside a page. Each gives the name of the new file, or nothing when the user
-// gave up.
+// Dialogs that make a first data file from inside a page, for its node. Each gives the name of the new file, or nothing
+// when the user gave up.
 #pragma once
 
 #include <optional>
@@ -14,19 +14,13 @@
 
 namespace tervane {
 
-/// What holds the values of a dialog while it is shown; no node of a setup.
-class DialogValues : public CTvnKvfBase {
- public:
-  DialogValues() : CTvnKvfBase("", "", nullptr) {}
-};
-
 /// A grid file with the geometry of the model and one value everywhere, or the values of a text file.
 class CData2DNdsCreateDlg : public CYbSEDlgBase {
  public:
   /// A grid of a quantity.
-  CData2DNdsCreateDlg(const PageContext& context, float value, const CYbSEKvfBase& node, int itemType);
+  CData2DNdsCreateDlg(const PageContext& context, float value, CYbSEKvfBase& node, int itemType);
   /// A grid of the model domain: 1 inside, 2 along its edge.
-  CData2DNdsCreateDlg(const PageContext& context, const CYbSEKvfBase& node);
+  CData2DNdsCreateDlg(const PageContext& context, CYbSEKvfBase& node);
 
   std::optional<FileName> Run();
 
@@ -34,9 +28,11 @@ class CData2DNdsCreateDlg : public CYbSEDlgBase {
   void Describe(PageForm& form) override;
 
  private:
-  CData2DNdsCreateDlg(const PageContext& context, const CYbSEKvfBase& node, float value, float deleteValue,
-                      int itemType, bool isDomain);
+  CData2DNdsCreateDlg(const PageContext& context, CYbSEKvfBase& node, float value, float deleteValue, int itemType,
+                      bool isDomain);
   std::string ImportText();
+  /// The key of the unit in which the file holds its values, the user's; 0 for values without a quantity.
+  int ValueUnit() const;
   /// Why the file cannot be made yet; empty when it stands.
   std::string CreateFile();
   /// What makes the grid of one value, from copies of what the form holds.
@@ -44,8 +40,6 @@ class CData2DNdsCreateDlg : public CYbSEDlgBase {
 
   enum Contents : int { kFixedValue = 0, kTextFile = 1 };
 
-  DialogValues values_;
-  const CYbSEKvfBase& forNode_;
   const bool isDomain_;
   const int itemType_;
   GridGeometry geometry_;
@@ -62,7 +56,7 @@ class CData2DNdsCreateDlg : public CYbSEDlgBase {
 /// An empty shape file.
 class CData2DShpCreateDlg : public CYbSEDlgBase {
  public:
-  CData2DShpCreateDlg(const PageContext& context, const std::string& baseName);
+  CData2DShpCreateDlg(const PageContext& context, CYbSEKvfBase& node, const std::string& baseName);
   std::optional<FileName> Run();
 
  protected:
@@ -71,7 +65,6 @@ class CData2DShpCreateDlg : public CYbSEDlgBase {
  private:
   std::string CreateFile();
 
-  DialogValues values_;
   FileName file_;
 };
 
@@ -79,7 +72,7 @@ class CData2DShpCreateDlg : public CYbSEDlgBase {
 class CTvnCreate0DNdsDlg : public CYbSEDlgBase {
  public:
   /// Without value types all are offered.
-  CTvnCreate0DNdsDlg(const PageContext& context, const CYbSEKvfBase& node, float value, std::vector<int> itemTypes,
+  CTvnCreate0DNdsDlg(const PageContext& context, CYbSEKvfBase& node, float value, std::vector<int> itemTypes,
                      std::vector<int> valueTypes);
   std::optional<FileName> Run();
 
@@ -89,8 +82,6 @@ class CTvnCreate0DNdsDlg : public CYbSEDlgBase {
  private:
   std::string CreateFile();
 
-  DialogValues values_;
-  const CYbSEKvfBase& forNode_;
   const std::vector<int> itemTypes_, valueTypes_;
   CYbDateTime start_, end_;
   double stepHours_ = 24;

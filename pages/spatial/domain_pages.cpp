@@ -10,6 +10,7 @@
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/file_controls.h"
 #include "pages/parts/plot_content.h"
+#include "platform/files.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
 #include "spatial/domain.h"
@@ -32,6 +33,8 @@ class CCatchmentDlg : public PageOf<CCatchmentKvf> {
   /// A number of the grid: the file's, or the node's own, which can be changed.
   Control& GridNumber(PageForm& form, const std::string& label, double& own, double GridGeometry::*inFile);
   bool BrowseShape(Host& host, const Host::FileQuestion& question);
+  /// Takes a shape file with the unit of its coordinates, which is asked for; false when the user gave up.
+  bool TakeShape(Host& host, const FileName& file);
   MapContent Map();
   MapContent DomainMap();
 
@@ -53,11 +56,15 @@ bool CCatchmentDlg::BrowseShape(Host& host, const Host::FileQuestion& asked) {
   Host::FileQuestion question = asked;
   question.current = n.ShapeFile().File.IsEmpty() ? folder : n.ShapeFile().File.Absolute();
   const auto path = host.AskFileToOpen(question);
-  if (!path) return false;
+  return path && TakeShape(host, FileName::Picked(*path, folder));
+}
+
+bool CCatchmentDlg::TakeShape(Host& host, const FileName& file) {
+  CCatchmentKvf& n = Node();
   const auto& units = FindItemType(quantity::kMapCoordinate)->unitKeys;
   Host::ItemQuestion axis;
   axis.title = "Shape axis units";
-  axis.file = *path;
+  axis.file = file.Absolute();
   axis.heads = {"Unit of the coordinates"};
   for (const int unit : units) {
     if (unit == n.ShapeAxisUnit) axis.current = static_cast<int>(axis.rows.size());
@@ -66,7 +73,7 @@ bool CCatchmentDlg::BrowseShape(Host& host, const Host::FileQuestion& asked) {
   const auto chosen = host.AskItem(axis);
   if (!chosen) return false;
   std::string problem;
-  if (!n.ChooseShapeFile(FileName::Picked(*path, folder), units[static_cast<std::size_t>(*chosen)], problem))
+  if (!n.ChooseShapeFile(file, units[static_cast<std::size_t>(*chosen)], problem))
     host.ShowMessage("Can not load shape file\n\n" + problem, Host::Icon::Error);
   return true;
 }
@@ -96,6 +103,26 @@ void CCatchmentDlg::Describe(PageForm& form) {
   Control& shape = form.ShapeFile("Filename:", n.ShapeFile());
   shape.Filter(kShapeFileFilter).DefaultExtension("shp").ShownWhen(fromShape).RevalidatesLater();
   shape.browse = [this, &shape](Host& host) { return BrowseShape(host, shape.fileQuestion); };
+  shape.enter = [this, enter = std::move(shape.enter)](const std::string& typed) {
+    CData2DShpFile& node = Node().ShapeFile();
+    const FileName before = node.File;
+    const std::string attribute = node.Attribute();
+    std::string expected = enter(typed);
+    const bool isOther = expected.empty() && node.File.Text() != before.Text() && FileExists(node.File.Absolute());
+    if (!isOther || TakeShape(Outside(), node.File)) return expected;
+    node.Choose(before, attribute);
+    return std::string("the unit of the file's coordinates must be chosen");
+  };
+  form.Button("Create...",
+              [this] {
+                CData2DShpCreateDlg dialog(Context(), Node(), "ModelDomain");
+                if (const auto file = dialog.Run()) {
+                  Node().ShapeFile().Choose(*file, {});
+                  Node().SetRevalidateAll();
+                  UpdateDoc(kDataChanged, "Create Shape File");
+                }
+              })
+      .ShownWhen(fromShape);
 
   PageForm& grid = form.Group("Grid");
   const auto cells = [&](const char* label, const char* key, int& own, int GridGeometry::*inFile) {

@@ -55,7 +55,8 @@ PageDriver::PageDriver(CFlowModelDoc& document, std::string_view path) {
 Control& PageDriver::Find(std::string_view label) {
   Control* found = nullptr;
   page_->Form().ForEach([&](Control& control) {
-    if (!found && (control.label == label || (control.label.empty() && control.key == label))) found = &control;
+    const bool isNamed = control.label == label || (control.label.empty() && control.key == label);
+    if (isNamed && (!found || (!found->IsShown() && control.IsShown()))) found = &control;
   });
   if (!found) throw std::runtime_error(fmt::format("the page has no {}", label));
   return *found;

@@ -52,7 +52,8 @@ class PageDriver {
 
   CYbSEDlgBase& Page() { return *page_; }
   ScriptedHost& Outside() { return host_; }
-  /// The control with that label; of controls without one, the one of that key. One that is not there fails the test.
+  /// The control with that label, the one that is shown where several bear it; of controls without a label the one of
+  /// that key. One that is not there fails the test.
   Control& Find(std::string_view label);
   /// Types a value; gives what was expected when it is refused.
   std::string Enter(std::string_view label, const std::string& typed) { return page_->Enter(Find(label), typed); }
