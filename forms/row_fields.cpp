@@ -80,4 +80,30 @@ Control& AddRowField(PageForm& form, std::shared_ptr<TableForm> table, std::shar
   return control;
 }
 
+Control& AddRowFile(PageForm& form, std::shared_ptr<TableForm> table, std::function<DataFileNode*()> current,
+                    std::string label) {
+  table->ReportCurrentRow();
+  Control& control = form.Bare(ControlKind::File, std::move(label));
+  control.node = nullptr;
+  control.Key("FILE_NAME").EnabledWhen("a row of the table is chosen", [current] { return current() != nullptr; });
+  control.subject = [table] { return table->CurrentSubject(); };
+  // The control of one file is made for each question, since rows come and go.
+  const auto withControl = [current, &control](auto ask, auto otherwise) -> decltype(otherwise) {
+    DataFileNode* file = current();
+    if (!file) return otherwise;
+    PageForm ofFile(*file);
+    Control& ofRow = ofFile.DataFile(control.label, *file);
+    ofRow.fileQuestion = control.fileQuestion;
+    return ask(ofRow);
+  };
+  control.text = [withControl] { return withControl([](Control& ofRow) { return ofRow.Text(); }, std::string()); };
+  control.enter = [withControl](const std::string& typed) {
+    return withControl([&](Control& ofRow) { return ofRow.enter(typed); }, NoCell().why);
+  };
+  control.browse = [withControl](Host& host) {
+    return withControl([&](Control& ofRow) { return ofRow.browse(host); }, false);
+  };
+  return control;
+}
+
 }  // namespace tervane

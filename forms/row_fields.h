@@ -9,6 +9,7 @@
 #pragma once
 
 #include "forms/table_of.h"
+#include "spatial/file_nodes.h"
 
 namespace tervane {
 
@@ -17,10 +18,26 @@ namespace tervane {
 Control& AddRowField(PageForm& form, std::shared_ptr<TableForm> table, std::shared_ptr<TableColumn> column,
                      std::string label, CellKind kind);
 
+/// Adds a control for a data file of the current row, with the item that is chosen in it; `current` gives the file,
+/// null without a row.
+Control& AddRowFile(PageForm& form, std::shared_ptr<TableForm> table, std::function<DataFileNode*()> current,
+                    std::string label);
+
 template <class Row>
 class RowFields : public ColumnMaker<Row> {
  public:
   RowFields(PageForm& form, std::shared_ptr<TableOf<Row>> table) : form_(form), table_(std::move(table)) {}
+
+  /// A data file of the row, by the request of its node.
+  Control& DataFile(std::string label, std::function<DataFileNode&(Row&)> file) {
+    return AddRowFile(
+        form_, table_,
+        [table = table_, file = std::move(file)]() -> DataFileNode* {
+          Row* row = table->Current();
+          return row ? &file(*row) : nullptr;
+        },
+        std::move(label));
+  }
 
  protected:
   TableColumn& AddOf(std::string label, std::optional<CellKind> kind) override {

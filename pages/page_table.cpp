@@ -12,6 +12,7 @@
 #include "pages/spatial/station_pages.h"
 #include "pages/spatial/zone_pages.h"
 #include "pages/surface/climate_pages.h"
+#include "pages/surface/irrigation_pages.h"
 #include "pages/surface/land_use_pages.h"
 #include "pages/surface/overland_pages.h"
 #include "pages/surface/vegetation_pages.h"
@@ -26,11 +27,11 @@ struct PageFile {
   std::span<const PageRow> (*rows)();
 };
 constexpr PageFile kFiles[] = {
-    {"document", DocumentPages},   {"simspec", ComponentsPages}, {"simspec", ControlPages},
-    {"simspec", PeriodPages},      {"spatial", Data2DPages},     {"spatial", DomainPages},
-    {"spatial", StationPages},     {"spatial", ZonePages},       {"surface", ClimatePages},
-    {"surface", LandUsePages},     {"surface", VegetationPages}, {"surface", OverlandPages},
-    {"execution", ProcessedPages},
+    {"document", DocumentPages},  {"simspec", ComponentsPages},  {"simspec", ControlPages},
+    {"simspec", PeriodPages},     {"spatial", Data2DPages},      {"spatial", DomainPages},
+    {"spatial", StationPages},    {"spatial", ZonePages},        {"surface", ClimatePages},
+    {"surface", LandUsePages},    {"surface", VegetationPages},  {"surface", OverlandPages},
+    {"surface", IrrigationPages}, {"execution", ProcessedPages},
 };
 
 std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, PageContext context) {

@@ -3,6 +3,7 @@
 #include "surface/land_use.h"
 
 #include "simspec/conditions.h"
+#include "surface/irrigation.h"
 #include "surface/pages.h"
 #include "surface/vegetation.h"
 
@@ -17,6 +18,9 @@ CLandUseKvf::CLandUseKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Land Use", "LandU
                  (Component(&CModelCompKvf::OL) && Method(&CModelCompKvf::OL_ModelType, kFiniteDifferenceOverland) &&
                   Component(&CModelCompKvf::SZ))));
   NewImportantChild<CVegetationKvf>(kVegetation);
+  NewChild<CIrrCommandAreasKvf>();
+  NewChild<CIrrDemandKvf>();
+  NewChild<CIrrPrioritiesKvf>();
 }
 
 bool CLandUseKvf::IsIrrigationPossible() const { return IrrigationPossible().Holds(*this); }

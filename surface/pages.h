@@ -17,6 +17,11 @@ inline constexpr PageClass kAirTemperaturePage{"CSnowmeltDlg", 16538};
 inline constexpr PageClass kAirTemperatureStationPage{"CSnowmeltTimeSeriesDlg", 16540};
 inline constexpr PageClass kSnowMeltPage{"CSnowmeltConstDlg", 16605};
 inline constexpr PageClass kLandUsePage{"CLandUseDlg", 16512};
+inline constexpr PageClass kCommandAreasPage{"CIrrCommandAreasDlg", 16506};
+inline constexpr PageClass kCommandAreaPage{"CIrrCommandAreasPropDlg", 16511};
+inline constexpr PageClass kDemandsPage{"CIrrDemandDlg", 16508};
+inline constexpr PageClass kDemandPage{"CIrrDemandPropDlg", 16509};
+inline constexpr PageClass kPrioritiesPage{"CIrrPrioritiesDlg", 16510};
 inline constexpr PageClass kVegetationPage{"CVegetationDlg", 16641};
 inline constexpr PageClass kVegetationStationPage{"CVegetationTimeSeriesDlg", 16642};
 

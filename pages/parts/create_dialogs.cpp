@@ -226,12 +226,17 @@ CTvnCreate0DNdsDlg::CTvnCreate0DNdsDlg(const PageContext& context, CYbSEKvfBase&
     : CYbSEDlgBase(node, WithoutDocument(context)),
       itemTypes_(std::move(itemTypes)),
       valueTypes_(valueTypes.empty() ? std::vector{0, 1, 2, 3} : std::move(valueTypes)),
-      value_(static_cast<double>(value)),
-      file_(NewFile(context, node.GetTitle(), "nds0")) {
+      value_(static_cast<double>(value)) {
+  SetTitle(node.GetTitle());
   if (const auto* period = node.Important(kSimulationPeriod)) {
     start_ = period->GetSimStartDate();
     end_ = period->SIMEND;
   }
+}
+
+void CTvnCreate0DNdsDlg::SetTitle(std::string title) {
+  title_ = std::move(title);
+  file_ = NewFile(Context(), title_, "nds0");
 }
 
 std::optional<FileName> CTvnCreate0DNdsDlg::Run() {
@@ -268,7 +273,7 @@ std::string CTvnCreate0DNdsDlg::CreateFile() {
   constexpr std::size_t kMostSteps = 50'000'000;
   NewSeries series;
   std::vector<std::string> notes;
-  series.name = Node().GetTitle();
+  series.name = title_;
   series.itemType = itemTypes_[static_cast<std::size_t>(itemType_)];
   series.valueType = valueTypes_[static_cast<std::size_t>(valueType_)];
   if (!Trimmed(rows_).empty()) {

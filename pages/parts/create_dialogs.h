@@ -74,6 +74,8 @@ class CTvnCreate0DNdsDlg : public CYbSEDlgBase {
   /// Without value types all are offered.
   CTvnCreate0DNdsDlg(const PageContext& context, CYbSEKvfBase& node, float value, std::vector<int> itemTypes,
                      std::vector<int> valueTypes);
+  /// What the series is called, after which its file is named; the title of the node unless told.
+  void SetTitle(std::string title);
   std::optional<FileName> Run();
 
  protected:
@@ -82,6 +84,7 @@ class CTvnCreate0DNdsDlg : public CYbSEDlgBase {
  private:
   std::string CreateFile();
 
+  std::string title_;
   const std::vector<int> itemTypes_, valueTypes_;
   CYbDateTime start_, end_;
   double stepHours_ = 24;

@@ -79,6 +79,16 @@ section LandUse {
     section TIME_SERIES_1 {
     }
   }
+  section CommandAreas {
+    NO_AREAS = 1
+    section CommandArea {
+    }
+  }
+  section Demands {
+    NO_DEMANDS = 1
+    section Demand {
+    }
+  }
 }
 section ExtraParams {
   NoOfParams = 2
@@ -117,9 +127,11 @@ bool IsDerived(const std::string& key) {
   for (const char* derived :
        {"IsDataUsedInSetup", "FlowModelDocVersion:Version", "YbSEKvfListItemCount",
         // Counts 0 or 1 instead of 2 items, the others are then unread.
-        "ExtraParams:NoOfParams", ":NO_ZONES", "Riverlinks:Noofreaches", "NO_TIMESERIES", "ITEM_COUNT",
+        "ExtraParams:NoOfParams", ":NO_", "NumberOfSources", "Riverlinks:Noofreaches", "NO_TIMESERIES", "ITEM_COUNT",
         // Of the zone's identity and place.
-        ":GRIDCODE", "ProfileSecNumber",
+        ":GRIDCODE", "ProfileSecNumber", ":AreaCode", ":DemandCode",
+        // Of other keys of the source.
+        ":RS_6", ":RS_7", "Source1:TYPE",
         // A kind of value that the file's value has not.
         "ExtraParam_1:Type", "ExtraParam_2:Type",
         // A zero area and an area of which the file says that it is undefined are the same.

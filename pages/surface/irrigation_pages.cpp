@@ -1,0 +1,260 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/surface/irrigation_pages.h"
+
+#include <algorithm>
+#include <iterator>
+
+#include <fmt/format.h>
+
+#include "forms/map_question.h"
+#include "forms/row_fields.h"
+#include "pages/parts/create_dialogs.h"
+#include "pages/parts/plot_content.h"
+#include "pages/parts/series_controls.h"
+#include "pages/parts/zone_controls.h"
+#include "platform/item_types.h"
+#include "surface/irrigation.h"
+#include "surface/pages.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr ZoneSourceWords kWords{};
+
+// ---- A command area
+
+using Source = CIrrCommandAreasPropSourceItemKvf;
+using SourceTable = TableOf<Source>;
+
+CellChoices ChoicesOf(KeyChoices keyChoices) {
+  CellChoices choices;
+  for (const KeyChoice& choice : keyChoices) choices.emplace_back(choice.value, std::string(choice.text));
+  return choices;
+}
+
+/// A command area with its sources; the current one is shown below their table.
+class CIrrCommandAreasPropDlg : public PageOf<CIrrCommandAreasPropKvf> {
+ public:
+  CIrrCommandAreasPropDlg(CYbSEKvfBase& node, PageContext context)
+      : PageOf(node, std::move(context)), question_(Context().syncSoon) {}
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  /// The columns of the table of sources.
+  std::shared_ptr<SourceTable> CIrrCommandAreasPropSourceGrid();
+  /// The current source is of that kind.
+  Condition IsCurrent(Source::Kind kind, const char* sentence) const;
+  void DescribeRiver(PageForm& form);
+  void DescribeSingleWell(PageForm& form);
+  void DescribeShallowWell(PageForm& form);
+  void DescribeLicense(PageForm& form);
+  void PickWell();
+  void CreateLicense();
+  MapContent Map() const;
+
+  std::shared_ptr<SourceTable> table_;
+  MapQuestion question_;
+};
+
+std::shared_ptr<SourceTable> CIrrCommandAreasPropDlg::CIrrCommandAreasPropSourceGrid() {
+  auto table = std::make_shared<SourceTable>(Node().Sources());
+  table->ItemName("Source");
+  table->Choice("Type", &Source::SourceTypeCode).Width(90);
+  // Applied as a sheet, water has an area of its own, which comes and goes in the tree.
+  table
+      ->Choice("Water Application", &Source::ShownApplication, &Source::SetShownApplication,
+               ChoicesOf(kShownApplications))
+      .Width(110)
+      .Key("WaterApplication")
+      .Hint(kDataChanged | kTreeRebuilt);
+  if (table->RowCount() > 0) table->Choose(1);
+  return table;
+}
+
+Condition CIrrCommandAreasPropDlg::IsCurrent(Source::Kind kind, const char* sentence) const {
+  return Sentence(sentence, [table = table_, kind] {
+    const Source* source = table->Current();
+    return source && source->SourceTypeCode == kind;
+  });
+}
+
+void CIrrCommandAreasPropDlg::DescribeRiver(PageForm& form) {
+  RowFields<Source> fields(form, table_);
+  fields.Value("River Name:", &Source::RiverNameRS);
+  fields.Value("Upsteam Chainage:", &Source::UpstreamChainageRS);
+  fields.Value("Downstream  Chainage:", &Source::DownstreamChainageRS);
+  fields.Value("Max rate:", &Source::CapacityRS);
+  const auto withoutDischarge = [](const Source& source) { return source.UseThresholdDischargeRateRS == 0; };
+  fields.Check("Use threshold river discharge", &Source::UseThresholdDischargeRateRS)
+      .Key("UseThresholdDischargeRateRS");
+  form.Label("River discharge:");
+  fields.Value("Stop", &Source::ThresholdDischargeRateStopRS).GreyWhen(withoutDischarge);
+  fields.Value("Restart", &Source::ThresholdDischargeRateRestartRS).GreyWhen(withoutDischarge);
+  const auto withoutStage = [](const Source& source) { return source.UseThresholdStageRS == 0; };
+  fields.Check("Use threshold river stage", &Source::UseThresholdStageRS).Key("UseThresholdStageRS");
+  form.Label("River stage:");
+  fields.Value("Stop", &Source::ThresholdStageStopRS).GreyWhen(withoutStage);
+  fields.Value("Restart", &Source::ThresholdStageRestartRS).GreyWhen(withoutStage);
+}
+
+void CIrrCommandAreasPropDlg::DescribeSingleWell(PageForm& form) {
+  RowFields<Source> fields(form, table_);
+  fields.Value("X-Pos:", &Source::WellXposSIWS);
+  fields.Value("Y-Pos:", &Source::WellYposSIWS);
+  form.Button("Pick Well on Map", [this] { PickWell(); })
+      .ToolTip("Takes the place of the well from a click on the map");
+  fields.Value("Max rate:", &Source::CapacitySIWS);
+  fields.Value("Max depth to water:", &Source::ThresholdDepthSIWS);
+  fields.Value("Top of screen:", &Source::ScreenTopDepthSIWS);
+  fields.Value("Bottom of Screen:", &Source::ScreenBottomDepthSIWS);
+}
+
+void CIrrCommandAreasPropDlg::DescribeShallowWell(PageForm& form) {
+  RowFields<Source> fields(form, table_);
+  fields.Value("Max rate:", &Source::CapacitySWS);
+  fields.Value("Max depth to water:", &Source::ThresholdDepthSWS);
+  fields.Value("Top of screen:", &Source::ScreenTopDepthSWS);
+  fields.Value("Bottom of screen:", &Source::ScreenBottomDepthSWS);
+}
+
+void CIrrCommandAreasPropDlg::DescribeLicense(PageForm& form) {
+  RowFields<Source> fields(form, table_);
+  const auto isLimited = Sentence("the source is limited by a license", [table = table_] {
+    const Source* source = table->Current();
+    return source && source->IrrigationLicenseIncluded;
+  });
+  fields.Check("Include License Limited Irrigation", &Source::IrrigationLicenseIncluded)
+      .Key("IrrigationLicenseIncluded");
+  fields.DataFile("Time Series File:", [](Source& source) -> DataFileNode& { return source.LicenseFile(); })
+      .Filter(kSeriesFileFilter)
+      .DefaultExtension("nds0")
+      .EnabledWhen(isLimited);
+  form.Button("Edit...",
+              [this] {
+                const Source* source = table_->Current();
+                if (source && Context().openDataFile) Context().openDataFile(source->LicenseFile().File.Absolute());
+              })
+      .EnabledWhen(isLimited);
+  form.Button("Create...", [this] { CreateLicense(); }).Beside().EnabledWhen(isLimited);
+}
+
+void CIrrCommandAreasPropDlg::PickWell() {
+  const Source* asked = table_->Current();
+  if (!asked) return;
+  question_.AskPoint("Click the place of the well. Esc gives up.", [this, asked](MapPoint place) {
+    // The source may have gone meanwhile, or another one may be the current one.
+    for (int row = 1; row <= table_->RowCount(); ++row) {
+      Source& source = table_->At(row);
+      if (&source != asked) continue;
+      source.WellXposSIWS = static_cast<float>(place.x);
+      source.WellYposSIWS = static_cast<float>(place.y);
+      UpdateDoc(kDataChanged, "Pick Place of the Well");
+    }
+  });
+}
+
+void CIrrCommandAreasPropDlg::CreateLicense() {
+  Source* source = table_->Current();
+  if (!source) return;
+  CTvnCreate0DNdsDlg dialog(Context(), Node(), 0, source->LicenseFile().ItemTypes, {});
+  dialog.SetTitle("License limitated irrigation");
+  if (const auto file = dialog.Run()) {
+    source->LicenseFile().Choose(*file);
+    UpdateDoc(kDataChanged, "Create Time Series File");
+  }
+}
+
+MapContent CIrrCommandAreasPropDlg::Map() const {
+  MapContent map = ZoneMap(*ZonesOf(Node()), &Node());
+  PointLayer wells;
+  for (int row = 1; row <= table_->RowCount(); ++row) {
+    const Source& source = table_->At(row);
+    if (source.SourceTypeCode != Source::kSingleWell) continue;
+    if (row == table_->CurrentRow()) wells.highlighted.place = wells.points.size();
+    wells.points.push_back({static_cast<double>(source.WellXposSIWS), static_cast<double>(source.WellYposSIWS)});
+    wells.labels.push_back(fmt::format("Source {}", row));
+  }
+  if (!wells.points.empty() && !map.IsEmpty()) map.points.insert(map.points.begin(), std::move(wells));
+  question_.PutOn(map);
+  return map;
+}
+
+void CIrrCommandAreasPropDlg::Describe(PageForm& form) {
+  CIrrCommandAreasPropKvf& n = Node();
+  table_ = CIrrCommandAreasPropSourceGrid();
+  ZoneName(form, "ID:", n);
+  ZoneIdentity(form, "areas", n, ZonesOf(n));
+  form.Label("Sources:");
+  form.Table(table_);
+  DescribeRiver(form.Group("River source", IsCurrent(Source::kRiver, "a river is the chosen source")));
+  DescribeSingleWell(
+      form.Group("Single well source", IsCurrent(Source::kSingleWell, "a single well is the chosen source")));
+  DescribeShallowWell(
+      form.Group("Shallow well source", IsCurrent(Source::kShallowWell, "shallow wells are the chosen source")));
+  PageForm& external = form.Group("External source", IsCurrent(Source::kExternal, "an external source is chosen"));
+  RowFields<Source>(external, table_).Value("Max rate:", &Source::CapacityES);
+  DescribeLicense(form.Group("License Limited Irrigation",
+                             Sentence("a source is chosen", [table = table_] { return table->Current() != nullptr; })));
+  const CodedZonesKvf* areas = ZonesOf(n);
+  form.Map([this] { return Map(); }).ShownWhen("the areas are distributed", [areas] {
+    return areas && areas->IsInForce();
+  });
+}
+
+// ---- A demand
+
+/// The series of the demand, below each other.
+SeriesContent DemandChart(const CIrrDemandPropKvf& demand) {
+  SeriesContent chart;
+  int panel = 0;
+  for (const DemandValue& value : CIrrDemandPropKvf::Values()) {
+    if (value.demandType != demand.DemandType) continue;
+    SeriesContent ofFile = FileChart(demand.FileOf(value));
+    for (Series& series : ofFile.series) {
+      series.name = value.chartTitle;
+      series.panel = panel;
+    }
+    std::ranges::move(ofFile.series, std::back_inserter(chart.series));
+    std::ranges::move(ofFile.awaited, std::back_inserter(chart.awaited));
+    chart.period = ofFile.period;
+    if (chart.message.empty()) chart.message = std::move(ofFile.message);
+    ++panel;
+  }
+  return chart;
+}
+
+void DescribeDemand(PageForm& form, CIrrDemandPropKvf& n, CYbSEDlgBase& page) {
+  using Demand = CIrrDemandPropKvf;
+  ZoneName(form, "ID:", n);
+  ZoneIdentity(form, "zones", n, ZonesOf(n));
+  form.Choice("Demand type:", n.DemandType).RevalidatesLater();
+  form.Choice("Temporal Distribution:", n.TYPE).RevalidatesLater();
+  form.Choice("Ref. moisture content:", n.DemandReferenceMoistureContent)
+      .ShownWhen(Is(n.DemandType, Demand::kMaxAllowedDeficit));
+  for (const DemandValue& value : Demand::Values()) {
+    const Condition isAsked = Is(n.DemandType, value.demandType);
+    form.Number(value.constantLabel, n.*value.constant).ShownWhen(isAsked && Is(n.TYPE, Demand::kConstant));
+    DescribeSeriesFile(form, page, value.fileLabel, n.FileOf(value), {n.*value.constant, {value.itemType}},
+                       isAsked && Is(n.TYPE, Demand::kSeries));
+  }
+  form.Chart([&n] { return DemandChart(n); }).ShownWhen(Is(n.TYPE, Demand::kSeries));
+  PlaceOfZone(form, n);
+}
+
+constexpr PageRow kPages[] = {
+    PageIs<ZonesPage<kWords>, CodedZonesKvf>(kCommandAreasPage),
+    PageIs<CIrrCommandAreasPropDlg, CIrrCommandAreasPropKvf>(kCommandAreaPage),
+    PageIs<ZonesPage<kWords>, CodedZonesKvf>(kDemandsPage),
+    DescribedBy<DescribeDemand>(kDemandPage),
+    PageIs<ZonesPage<kWords>, CodedZonesKvf>(kPrioritiesPage),
+};
+
+}  // namespace
+
+std::span<const PageRow> IrrigationPages() { return kPages; }
+
+}  // namespace tervane
