@@ -3,13 +3,13 @@
 
 // Between the text of a library and its entries.
 #include <algorithm>
-#include <charconv>
 #include <cmath>
 
 #include <fmt/format.h>
 
 #include "core/kvf_parser.h"
 #include "core/kvf_writer.h"
+#include "libraries/kept_text.h"
 #include "libraries/library.h"
 #include "platform/text.h"
 
@@ -19,54 +19,6 @@ namespace {
 
 /// Steps of indentation.
 enum Level { kTop, kInTarget, kInEntry };
-
-std::string Indented(int level, std::string_view text) {
-  return fmt::format("{:{}}{}", "", 2 * static_cast<std::size_t>(level), text);
-}
-
-std::string NodeText(const KvfNode& node, int level) {
-  KvfSection one;
-  std::string text;
-  if (const KvfSection* section = AsSection(&node)) {
-    KvfSection copy = *section;
-    copy.next = nullptr;
-    one.firstChild = &copy;
-    AppendKvfNodes(one, level, text);
-  } else {
-    KvfNode copy = node;
-    copy.next = nullptr;
-    one.firstChild = &copy;
-    AppendKvfNodes(one, level, text);
-  }
-  return text;
-}
-
-int LastLine(const KvfNode& node) {
-  int last = static_cast<int>(node.line);
-  if (const KvfSection* section = AsSection(&node))
-    for (const KvfNode* child = section->firstChild; child; child = child->next)
-      last = std::max(last, LastLine(*child));
-  return last;
-}
-
-/// A number in any of its forms; NaN for none.
-double NumberOf(const KvfParam& param) {
-  switch (param.type) {
-    case KvfType::Int:
-      return param.asInt;
-    case KvfType::Double:
-      return param.asDouble;
-    case KvfType::Float: {
-      // The digits that stand in the file, not those of the nearest float.
-      const std::string text = ShortestNumber(param.asFloat);
-      double value = param.asFloat;
-      std::from_chars(text.data(), text.data() + text.size(), value);
-      return value;
-    }
-    default:
-      return std::numeric_limits<double>::quiet_NaN();
-  }
-}
 
 class Reader {
  public:
@@ -79,17 +31,17 @@ class Reader {
     for (const KvfNode* node = file_.top.firstChild; node; node = node->next) {
       const KvfSection* target = AsSection(node);
       if (isFound || !target || target->Name() != kind_.target) {
-        KeepNode(*node, kTop);
+        kept_.Keep(*node, kTop);
         continue;
       }
       isFound = true;
-      library_.beforeTarget = TakeOthers() + Lines(kTop, CommentsUntil(static_cast<int>(target->line)));
+      library_.beforeTarget = kept_.Take() + IndentedLines(kTop, kept_.CommentsUntil(static_cast<int>(target->line)));
       ReadTarget(*target);
-      library_.atEnd = TakeOthers();
+      library_.atEnd = kept_.Take();
       // Behind the last of all nothing tells where a comment stands.
-      if (!target->next) library_.atEnd += Lines(kInTarget, CommentsUntil(std::numeric_limits<int>::max()));
+      if (!target->next) library_.atEnd += IndentedLines(kInTarget, kept_.CommentsUntil(KeptText::kEndOfFile));
     }
-    library_.behindTarget = TakeOthers() + Lines(kTop, CommentsUntil(std::numeric_limits<int>::max()));
+    library_.behindTarget = kept_.Take() + IndentedLines(kTop, kept_.CommentsUntil(KeptText::kEndOfFile));
     return isFound;
   }
 
@@ -107,7 +59,7 @@ class Reader {
       if (IsEntry(*node))
         ReadEntry(*AsSection(node));
       else
-        KeepNode(*node, kInTarget);
+        kept_.Keep(*node, kInTarget);
     }
   }
 
@@ -118,8 +70,8 @@ class Reader {
     TakeContext(section, entry.context);
     entry.rows.reserve(section.count);
     for (const KvfNode* node = section.firstChild; node; node = node->next)
-      if (!node->IsKeyword() || !(ReadField(*node, entry) || ReadRow(*node, entry))) KeepNode(*node, kInEntry);
-    entry.atEnd = TakeOthers();
+      if (!node->IsKeyword() || !(ReadField(*node, entry) || ReadRow(*node, entry))) kept_.Keep(*node, kInEntry);
+    entry.atEnd = kept_.Take();
   }
 
   bool ReadField(const KvfNode& keyword, LibraryEntry& entry) {
@@ -151,7 +103,7 @@ class Reader {
     }
     LibraryRow& row = entry.rows.emplace_back();
     row.line = static_cast<int>(keyword.line);
-    for (std::size_t i = 0; i < count; ++i) row.values[i] = NumberOf(keyword.params[i]);
+    for (std::size_t i = 0; i < count; ++i) row.values[i] = KvfNumber(keyword.params[i]);
     for (std::size_t i = count; i < keyword.count; ++i) row.more += ", " + KvfValueText(keyword.params[i]);
     TakeContext(keyword, row.context);
     return true;
@@ -164,56 +116,20 @@ class Reader {
     return false;
   }
 
-  // ---- What means nothing to the kind
-
-  /// The comments up to a line, a line each.
-  std::string CommentsUntil(int line) {
-    std::string text;
-    for (; next_ < file_.comments.size() && file_.comments[next_].line < line; ++next_) {
-      text += Trimmed(file_.comments[next_].text);
-      text += '\n';
-    }
-    return text;
-  }
-  static std::string Lines(int level, const std::string& comments) {
-    std::string text;
-    for (std::size_t begin = 0; begin < comments.size();) {
-      const std::size_t end = comments.find('\n', begin);
-      text += Indented(level, std::string_view(comments).substr(begin, end - begin)) + "\n";
-      begin = end + 1;
-    }
-    return text;
-  }
-  std::string TakeOthers() { return std::exchange(others_, {}); }
   void TakeContext(const KvfNode& node, LibraryContext& context) {
     const int line = static_cast<int>(node.line);
-    if (!others_.empty()) context.others = TakeOthers();
-    if (next_ == file_.comments.size() || file_.comments[next_].line > line) return;
-    context.comment = CommentsUntil(line);
-    if (next_ < file_.comments.size() && file_.comments[next_].line == line)
-      context.behind = Trimmed(file_.comments[next_++].text);
-  }
-  void KeepNode(const KvfNode& node, int level) {
-    others_ += Lines(level, CommentsUntil(LastLine(node) + 1));
-    others_ += NodeText(node, level);
+    if (std::string others = kept_.Take(); !others.empty()) context.others = std::move(others);
+    context.comment = kept_.CommentsUntil(line);
+    context.behind = kept_.CommentOn(line);
   }
 
   const KvfFile& file_;
   Library& library_;
   const LibraryKind& kind_;
-  std::size_t next_ = 0;  ///< The first comment that is not taken.
-  std::string others_;    ///< What was met since the last part of the library.
+  KeptText kept_{file_};
 };
 
 // ---- Writing
-
-std::string TextValue(const std::string& text) {
-  KvfParam param;
-  param.type = KvfType::String;
-  param.text = text.c_str();
-  param.length = static_cast<std::uint32_t>(text.size());
-  return KvfValueText(param);
-}
 
 std::string NumberValue(const LibraryColumn& column, double value) {
   KvfParam param;
@@ -228,13 +144,8 @@ std::string NumberValue(const LibraryColumn& column, double value) {
 }
 
 void AppendLine(std::string& text, int level, const std::string& line, const LibraryContext& context) {
-  text += context.others;
-  for (std::size_t begin = 0; begin < context.comment.size();) {
-    const std::size_t end = context.comment.find('\n', begin);
-    text += Indented(level, std::string_view(context.comment).substr(begin, end - begin)) + "\n";
-    begin = end + 1;
-  }
-  text += Indented(level, line);
+  text += context.others + IndentedLines(level, context.comment);
+  text += IndentedLine(level, line);
   if (!context.behind.empty()) text += "  " + context.behind;
   text += '\n';
 }
@@ -245,7 +156,7 @@ void AppendEntry(std::string& text, const LibraryKind& kind, const LibraryEntry&
   for (std::size_t i = 0; i < kind.fields.size(); ++i) {
     const LibraryText& field = entry.fields[i];
     if (field.isThere || !field.text.empty())
-      AppendLine(text, kInEntry, fmt::format("{} = {}", kind.fields[i].key, TextValue(field.text)), field.context);
+      AppendLine(text, kInEntry, fmt::format("{} = {}", kind.fields[i].key, KvfTextValue(field.text)), field.context);
   }
   for (const LibraryRow& row : entry.rows) {
     std::string line = fmt::format("{} = ", kind.rowKey);
@@ -253,7 +164,7 @@ void AppendEntry(std::string& text, const LibraryKind& kind, const LibraryEntry&
       line += (i > 0 ? ", " : "") + NumberValue(kind.columns[i], row.values[i]);
     AppendLine(text, kInEntry, line + row.more, row.context);
   }
-  text += entry.atEnd + Indented(kInTarget, "}\n");
+  text += entry.atEnd + IndentedLine(kInTarget, "}\n");
 }
 
 }  // namespace
