@@ -94,6 +94,10 @@ class CYbSEDocument {
   EngineShell* GetEngineShell() const { return engineShell_; }
   /// A file that the engine must leave; set anew for each start.
   void SetReport(const std::string& path) { launch_.Report = path; }
+  /// What the user should know of the save that is being done.
+  void AddSaveNote(std::string note) { saveNotes_.push_back(std::move(note)); }
+  /// Below which results lie, as the file holds it; mostly empty.
+  const FileName& ProjectResultRoot() const { return projectResultRoot_; }
   /// What a kind of document does when its tree has been read.
   virtual void OnLoaded() {}
   void AddToReport(LoadReport::Kind kind, std::string text) {

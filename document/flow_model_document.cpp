@@ -4,6 +4,7 @@
 
 #include <fmt/format.h>
 
+#include "document/river_simulation_file.h"
 #include "execution/execute_flags.h"
 #include "platform/paths.h"
 #include "platform/text.h"
@@ -15,6 +16,31 @@ namespace tervane {
 CFlowModelDoc::CFlowModelDoc() : CYbSEDocument(std::make_unique<CGlobal>()) { Root().Validate(); }
 
 void CFlowModelDoc::OnLoaded() { Root().Validate(); }
+
+// ---- Saving
+
+bool CFlowModelDoc::OnSaveDocument(const std::string& path) {
+  if (!CYbSEDocument::OnSaveDocument(path)) return false;
+  const CModelCompKvf& components = ModelCompOf(Root());
+  const auto* river = Root().Important(kRiver);
+  if (!river || !components.River) return true;
+  RewriteRiverFile(river->GetFilename());
+  const auto* waterQuality = Root().Important(kWaterQualityComponents);
+  if (components.WQ && waterQuality && waterQuality->River) RewriteRiverFile(river->GetFilenameWQ());
+  return true;
+}
+
+void CFlowModelDoc::RewriteRiverFile(const FileName& file) {
+  if (file.IsEmpty()) return;
+  // A name that was typed before the first save has got its folder by now.
+  const std::string& setupFolder = Root().SetupFolder();
+  const std::string river = ResolvedPath(file.TextIn(setupFolder), setupFolder);
+  const std::string folder(FolderOf(river));
+  std::string error;
+  if (RewriteRiverSimulationFile(river, ProjectResultRoot().TextIn(folder), UseCustomResultFolder,
+                                 CustomResultFolder.TextIn(folder), error) != 0)
+    AddSaveNote(fmt::format("the river simulation file did not get the result folder of the setup: {}", error));
+}
 
 // ---- Engines
 

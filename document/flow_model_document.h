@@ -19,6 +19,10 @@ class CFlowModelDoc : public CYbSEDocument {
   CGlobal& Global() const { return static_cast<CGlobal&>(Root()); }
   static constexpr std::string_view kEditorName = "Flow Model";
 
+  /// Saves, and then gives the files of a river simulation that takes part the result location of the setup. A river
+  /// file that cannot be written leaves the save done, with a note.
+  bool OnSaveDocument(const std::string& path) override;
+
   // ---- Engines. Both save first, so that a run begins with what the user sees; a save that fails is told, and nothing
   // is started.
 
@@ -48,6 +52,7 @@ class CFlowModelDoc : public CYbSEDocument {
 
  private:
   bool SaveForRun();
+  void RewriteRiverFile(const FileName& file);
   std::string ResultFile(std::string_view stemEnd, std::string_view extension) const;
 };
 

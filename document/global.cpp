@@ -24,6 +24,7 @@
 #include "surface/climate.h"
 #include "surface/land_use.h"
 #include "surface/overland.h"
+#include "surface/rivers.h"
 
 namespace tervane {
 
@@ -71,6 +72,8 @@ constexpr std::array kChildren{
     Child<CPrecipitationRelatedKvf>(kClimate),
     Child<CLandUseKvf>(kLandUse),
     Child<CEvapotransKvf>(kOldEvapotranspiration),
+    Child<CRiverKvf>(kRiver),
+    Child<CRiverMFKvf>(kModflowRiver),
     Child<COverlandKvf>(kOverland),
     Child<CTopographicalRoutingKvf>(kOverlandZones),
     ChildRow{MakeBy<NewGroundwaterTable>, {}},

@@ -2,37 +2,55 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "document/river_simulation_file.h"
 
+#include <fmt/format.h>
+
 #include "core/kvf.h"
+#include "core/kvf_parser.h"
+#include "libraries/kept_text.h"
+#include "platform/files.h"
 #include "platform/text.h"
 
 namespace tervane {
 
-int RewriteRiverSimulationFile(const std::string& path, std::string_view resultRoot, int useCustomFolder,
-                               std::string_view customFolder, std::string& error) {
-  kvfGetErrorGlb();  // what an earlier reader left
-  KvfFile* old = kvfLoadFile(path, 1);
-  if (kvfGetErrorGlb() != kKvfNoError) {
-    error = kvfErrorText();
-    kvfClose(&old);
-    return -1;
-  }
+namespace {
+
+std::string ResultLocation(std::string_view resultRoot, int useCustomFolder, std::string_view customFolder) {
   KvfFile* file = kvfCreate();
-  for (int n = 1; n <= kvfGetNoTargets(old); ++n) {
-    KvfNode* target = kvfTargetByNum(old, n);
-    const char* name = kvfGetName(target);
-    if (EqualIgnoringCase(name, "SYSTEM")) continue;
-    kvfAddTarget(file, target->WrittenName());
-    kvfEndSection(file);
-    kvfCopy(target, kvfTargetByNum(file, kvfGetNoTargets(file)));
-  }
-  kvfClose(&old);
   kvfSetProjectResultRoot(file, resultRoot);
   kvfSetCustomResultFolder(file, useCustomFolder, customFolder);
-  kvfWrite(file, path);
+  std::string text = KvfNodeText(*file->top.firstChild, 0);
   kvfClose(&file);
-  if (kvfGetErrorGlb() == kKvfNoError) return 0;
-  error = kvfErrorText();
-  return -1;
+  return text;
+}
+
+}  // namespace
+
+int RewriteRiverSimulationFile(const std::string& path, std::string_view resultRoot, int useCustomFolder,
+                               std::string_view customFolder, std::string& error) {
+  FileContent content;
+  if (FileResult read = ReadWholeFile(path, content); !read.Ok()) {
+    error = std::move(read.error);
+    return -1;
+  }
+  KvfFile old;
+  if (!ParseKvf(content, old)) {
+    error = fmt::format("{}:{}", path, old.syntaxError.message);
+    return -1;
+  }
+  KeptText others(old);
+  std::string location;
+  for (const KvfNode* target = old.top.firstChild; target; target = target->next) {
+    if (EqualIgnoringCase(target->Name(), "SYSTEM"))
+      location += KvfNodeText(*target, 0);
+    else
+      others.Keep(*target, 0);
+  }
+  std::string wanted = ResultLocation(resultRoot, useCustomFolder, customFolder);
+  if (location == wanted) return 0;
+  others.KeepCommentsUntil(KeptText::kEndOfFile, 0);
+  FileResult written = WriteFileAtomically(path, std::string(old.header) + others.Take() + wanted);
+  error = std::move(written.error);
+  return written.Ok() ? 0 : -1;
 }
 
 }  // namespace tervane

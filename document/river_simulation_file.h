@@ -7,9 +7,9 @@
 
 namespace tervane {
 
-/// Gives a river simulation file the result location of the setup: copies all its targets but `SYSTEM` (whatever its
-/// case) and writes a new one. 0 when done, -1 when the file cannot be read or written; it then stands as it was, and
-/// `error` says why.
+/// Gives a river simulation file the result location of the setup, in its target `SYSTEM` (whatever its case); all else
+/// stays. A file that has it already is left alone. 0 when done, -1 when the file cannot be read or written; it then
+/// stands as it was, and `error` says why.
 int RewriteRiverSimulationFile(const std::string& path, std::string_view resultRoot, int useCustomFolder,
                                std::string_view customFolder, std::string& error);
 

@@ -6,10 +6,13 @@
 
 #include <fmt/format.h>
 
+#include "libraries/river_network.h"
 #include "overlays/pages.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
+#include "platform/text.h"
 #include "platform/units.h"
+#include "simspec/model_components.h"
 
 namespace tervane {
 
@@ -101,6 +104,22 @@ void COverlayRiverKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Display", Display);
 }
 
+FileName COverlayRiverKvf::DrawnFile() const {
+  return SourceFvrNwkType == kOfSetup ? RiverFileOfSetup(*this) : FvrNwkFilename_Specified;
+}
+
+FileName COverlayRiverKvf::GetRiverFile() {
+  FileName file = DrawnFile();
+  if (SourceFvrNwkType != kOfSetup || EngineOf(*this) != kEngineTervane) return file;
+  // Only a simulation leads on.
+  if (!EqualIgnoringCase(ExtensionOf(file.Text()), ".fvsim")) return {};
+  const NamedNetwork named = NetworkOfSimulation(file.Absolute());
+  const std::string folder = GetRoot() ? GetRoot()->SetupFolder() : std::string();
+  FvrNwkFilename_Specified = named.problem.empty() ? FileName::Picked(named.path, folder) : FileName();
+  SourceFvrNwkType = kOwnFile;
+  return FvrNwkFilename_Specified;
+}
+
 void COverlayWellKvf::ExchangeKeys(KeyExchange& keys) {
   FileKey(keys, "WellFilename", WellFilename);
   keys("Display", Display);
@@ -138,6 +157,16 @@ const std::string& COverlayItemKvf::GetAbbreviatedTitle() const {
         fmt::format("{}{}: {}", layer->Display ? "" : "Disabled ", kind->name, path.empty() ? "Unknown" : name);
   }
   return shownTitle_;
+}
+
+void COverlayListKvf::StayWithRivers() {
+  for (int number = 1; number <= GetItemCount(); ++number) {
+    const COverlayItemKvf& item = *GetItem(number);
+    auto* river = dynamic_cast<COverlayRiverKvf*>(item.Layer());
+    if (!river || river->SourceFvrNwkType != COverlayRiverKvf::kOfSetup) continue;
+    river->FvrNwkFilename_Specified = river->GetRiverFile();
+    river->SourceFvrNwkType = COverlayRiverKvf::kOwnFile;
+  }
 }
 
 void COverlayCurrentLayerGridKvf::ExchangeKeys(KeyExchange& keys) {

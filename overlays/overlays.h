@@ -7,6 +7,7 @@
 #include <string>
 
 #include "core/list.h"
+#include "simspec/river_files.h"
 #include "spatial/domain.h"
 #include "spatial/file_nodes.h"
 
@@ -89,9 +90,16 @@ class COverlayRiverKvf : public OverlayLayer {
  public:
   explicit COverlayRiverKvf(CYbSEKvfBase* parent) : OverlayLayer("River overlay", "OverlayRiver", parent) {}
 
-  int SourceFvrNwkType = 1;  ///< 0 the network of the setup, 1 a file.
-  FileName FvrNwkFilename_Specified;
+  enum Source : int { kOfSetup = 0, kOwnFile = 1 };
 
+  int SourceFvrNwkType = kOwnFile;
+  FileName FvrNwkFilename_Specified;  ///< The own file.
+
+  /// The file that leads to the network that is drawn; empty for none.
+  FileName DrawnFile() const;
+  /// The network, for one that is to stay with it: a layer that followed a river simulation keeps the network of that
+  /// simulation as its own file from now on.
+  FileName GetRiverFile();
   const FileName& LayerFile() const override { return FvrNwkFilename_Specified; }
 
  protected:
@@ -136,9 +144,11 @@ class COverlayItemKvf : public CTvnKvfBase {
 };
 
 /// The layers above or below the data.
-class COverlayListKvf : public CYbSEKvfListBase<COverlayItemKvf> {
+class COverlayListKvf : public CYbSEKvfListBase<COverlayItemKvf>, public RiverFollowers {
  public:
   COverlayListKvf(std::string title, CYbSEKvfBase* parent) : CYbSEKvfListBase(title, title, parent) {}
+
+  void StayWithRivers() override;
 };
 inline constexpr ImportantName<COverlayListKvf> kBackgroundOverlays{"BACKGROUND_OVERLAY_DATA"};
 inline constexpr ImportantName<COverlayListKvf> kForegroundOverlays{"FOREGROUND_OVERLAY_DATA"};

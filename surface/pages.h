@@ -30,5 +30,7 @@ inline constexpr PageClass kPondedWaterExchangePage{"CPondedWaterExchangeDlg", 0
 inline constexpr PageClass kPondedDrainagePage{"CPondedDrainageDlg", 0};
 inline constexpr PageClass kOverlandZonesPage{"CTopographicalRoutingDlg", 0};
 inline constexpr PageClass kOverlandZonePage{"CTopographicalRoutingPropDlg", 0};
+inline constexpr PageClass kRiverPage{"CRiverDlg", 0};
+inline constexpr PageClass kModflowRiverPage{"CRiverMFDlg", 0};
 
 }  // namespace tervane

@@ -7,8 +7,10 @@
 #include <fmt/format.h>
 #include <gmock/gmock.h>
 
+#include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
 #include "simspec/river_files.h"
+#include "surface/rivers.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -46,14 +48,6 @@ class NotingShell : public EngineShell, public NobodyToAsk {
                                 launch.ExtraLog, launch.Report, showsProgress ? "" : " hidden"));
   }
   bool IsExecuting() const override { return !notes.empty(); }
-};
-
-/// The node that names the river simulation.
-class River : public CTvnKvfBase, public RiverFiles {
- public:
-  explicit River(CYbSEKvfBase* parent) : CTvnKvfBase("River", "River", parent) {}
-  FileName file{"rivers/karup.fvsim", "/data"};
-  const FileName& GetFilename() const override { return file; }
 };
 
 class FlowModelDocument : public testing::Test {
@@ -94,14 +88,14 @@ TEST_F(FlowModelDocument, RunsTheEngineOnTheSavedFile) {
   document.SetEngineShell(&shell);
   document.RunEngine("/WM");
   EXPECT_NE(document.IsExecuting(), 0);
-  auto* river = document.Root().NewChild<River>();
-  document.Root().RegisterImportantNode(river, "River");
+  auto& river = dynamic_cast<CRiverKvf&>(*document.Root().Important(kRiver));
+  river.SetRiverFile(FileName("rivers/karup.fvsim", "/data"));
   shell.isShiftHeld = true;
   shell.hasChanges = true;
   document.RunEngine("");
   shell.isShiftHeld = false;
   // The log of an earlier start stays.
-  river->file = FileName("other.fvsim", "/data");
+  river.SetRiverFile(FileName("other.fvsim", "/data"));
   document.Root().Important(kModelComponents)->River = 0;
   document.RunEngine("/PP");
   document.RunExtraction(1, -1);
@@ -118,6 +112,40 @@ TEST_F(FlowModelDocument, RunsTheEngineOnTheSavedFile) {
                           "PTRetrieval_Launch.exe /data/karup.tvd [/Engine 1 /SelPostProc -1] log "
                           "[/data/rivers/karupFvrProgress.log] report []",
                           "save", "told: Unable to run setup: Failed to save specification file."));
+}
+
+TEST_F(FlowModelDocument, GivesTheRiverSimulationItsResultFolderAtEachSave) {
+  const std::string river = folder.Write("rivers/a.fvsim", "target FvRun {\n}\ntarget System {\n}\n");
+  const std::string quality = folder.Write("rivers/wq.fvsim", "target FvRun {\n}\n");
+  const std::string unchanged = ReadFile(quality);
+  Open(SetupText(14,
+                 "section SimSpec {\nsection ModelComp {\nRiver = 1\n}\n}\n"
+                 "section River {\nFilename = file \"rivers/a.fvsim\"\nFilenameWQ = file \"rivers/wq.fvsim\"\n}"));
+  document.UseCustomResultFolder = true;
+  document.CustomResultFolder = FileName("out", folder.Path());
+  ASSERT_TRUE(document.OnSaveDocument(path)) << document.Error();
+  const auto told = [](const std::string& name) { return HasSubstr("CustomResultFolder = file \"" + name + "\""); };
+  // The same folder, seen from where the river file lies.
+  EXPECT_THAT(ReadFile(river), told("../out"));
+  EXPECT_EQ(ReadFile(quality), unchanged);
+  document.Root().Important(kModelComponents)->WQ = 1;
+  document.Root().Important(kWaterQualityComponents)->River = 1;
+  // With another engine the component still decides.
+  document.Root().Important(kBasicParameters)->ModelType = kEngineModflow2000;
+  ASSERT_TRUE(document.OnSaveDocument(path));
+  EXPECT_THAT(ReadFile(quality), told("../out"));
+  EXPECT_THAT(document.SaveNotes(), IsEmpty());
+  // What cannot be written is told, and the setup is saved all the same.
+  const std::string cut = "target FvRun {";
+  folder.Write("rivers/a.fvsim", cut);
+  document.CustomResultFolder = FileName("out2", folder.Path());
+  ASSERT_TRUE(document.OnSaveDocument(path));
+  EXPECT_THAT(document.SaveNotes(), ElementsAre(HasSubstr("a.fvsim:1:")));
+  EXPECT_EQ(ReadFile(river), cut);
+  EXPECT_THAT(ReadFile(path), told("out2"));
+  document.Root().Important(kModelComponents)->River = 0;
+  ASSERT_TRUE(document.OnSaveDocument(path));
+  EXPECT_THAT(document.SaveNotes(), IsEmpty());
 }
 
 TEST_F(FlowModelDocument, KeepsTheCustomResultFolderInTheFile) {

@@ -14,24 +14,28 @@ using test::TempFolder;
 
 TEST(RiverSimulationFile, GetsTheSetupsResultLocationAndKeepsAllElse) {
   const TempFolder folder;
-  const std::string path = folder.Write("river.fvsim", R"(target FLUVANE {
+  const std::string path = folder.Write("river.fvsim", R"(# of the user
+target FLUVANE {
   "network " = 1, 2f, 3.0, true, "x", file "net.fvnwk"
   section Reach {
   }
   section Reach {
-    A =
+    A =   # nothing
   }
 }
 target System {
   Old = 1
 }
+# second
 target FLUVANE {
   B = 2
 }
 )");
   std::string error;
   EXPECT_EQ(RewriteRiverSimulationFile(path, "", 1, "out", error), 0) << error;
-  const std::string expected = R"(target FLUVANE {
+  EXPECT_EQ(ReadFile(path), R"(# of the user
+# nothing
+target FLUVANE {
   "network " = 1, 2f, 3.0, true, "x", file "net.fvnwk"
   section Reach {
   }
@@ -39,6 +43,7 @@ target FLUVANE {
     A =
   }
 }
+# second
 target FLUVANE {
   B = 2
 }
@@ -47,11 +52,24 @@ target SYSTEM {
   UseCustomResultFolder = 1
   CustomResultFolder = file "out"
 }
-)";
-  EXPECT_EQ(ReadFile(path), expected);
-  // Once more: the new target is replaced, not repeated.
-  EXPECT_EQ(RewriteRiverSimulationFile(path, "", 1, "out", error), 0);
-  EXPECT_EQ(ReadFile(path), expected);
+)");
+}
+
+TEST(RiverSimulationFile, IsLeftAloneWhenItHasTheLocationAlready) {
+  const TempFolder folder;
+  const std::string location =
+      "target SYSTEM { ProjectResultRoot = file \"/runs\"\nUseCustomResultFolder = 0\nCustomResultFolder = file \"\" "
+      "}\n";
+  const std::string own = location + "# own layout\ntarget FvRun {\nA=1\n}\n";
+  const std::string path = folder.Write("river.fvsim", own);
+  std::string error;
+  EXPECT_EQ(RewriteRiverSimulationFile(path, "/runs", 0, "", error), 0) << error;
+  EXPECT_EQ(ReadFile(path), own);
+  // One of two would be the engine's choice.
+  folder.Write("river.fvsim", own + location);
+  EXPECT_EQ(RewriteRiverSimulationFile(path, "/runs", 0, "", error), 0) << error;
+  const std::string once = ReadFile(path);
+  EXPECT_EQ(once.find("SYSTEM"), once.rfind("SYSTEM"));
 }
 
 TEST(RiverSimulationFile, AFileThatCannotBeReadStaysAsItWas) {
