@@ -16,6 +16,7 @@ void OfferImports(CommandOffers& offers) {
   CLI::App* family = offers.Family("import", "Make data files of other files");
   OfferSeriesImport(offers, family);
   OfferGridImport(offers, family);
+  OfferRiverImport(offers, family);
 }
 
 /// A file of commands is one row here, in the order of the help.

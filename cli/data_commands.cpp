@@ -10,6 +10,7 @@
 #include "cli/json.h"
 #include "cli/library_info.h"
 #include "cli/offers.h"
+#include "cli/river_commands.h"
 #include "data/datafile.h"
 #include "data/datafile_request.h"
 #include "geometry/shapes.h"
@@ -222,6 +223,7 @@ bool HasExtension(const std::string& path, std::initializer_list<std::string_vie
 
 int DataInfoCommand(const std::string& path, bool json, Streams streams) {
   if (const LibraryKind* kind = LibraryKindOf(path)) return PrintLibrary(*kind, path, json, streams);
+  if (LeadsToRiver(path)) return PrintRiver(path, json, streams);
   if (HasExtension(path, {".shp"})) return PrintShapes(path, json, streams);
   if (HasExtension(path, {".txt", ".xyz"})) return PrintPoints(path, json, streams);
   DataFile file;
@@ -271,7 +273,8 @@ void OfferDataCommands(CommandOffers& offers) {
   };
   auto options = std::make_shared<Options>();
   CLI::App* data = offers.Family(
-      "data", "Look into data files (.nds0 to .nds3, netCDF), rasters (GeoTIFF, ...) and libraries (.etv)");
+      "data",
+      "Look into data files (.nds0 to .nds3, netCDF), rasters (GeoTIFF, ...), libraries (.etv) and river networks");
   CLI::App* info = offers.Command(
       "info", "Tell items, times and place",
       [offers, options] { return DataInfoCommand(options->file, options->json, offers.Output()); }, data);

@@ -68,6 +68,7 @@ void OfferDataCommands(CommandOffers& offers);
 /// Below the family `import`.
 void OfferSeriesImport(CommandOffers& offers, CLI::App* family);
 void OfferGridImport(CommandOffers& offers, CLI::App* family);
+void OfferRiverImport(CommandOffers& offers, CLI::App* family);
 void OfferExportCommand(CommandOffers& offers);
 void OfferCompletion(CommandOffers& offers);
 

@@ -11,10 +11,14 @@
 #include "data/datafile.h"
 #include "data/grid_files.h"
 #include "geometry/grid_polygons.h"
+#include "geometry/shapes.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"
+#include "platform/units.h"
 #include "simspec/periods.h"
+#include "simspec/river_branches.h"
+#include "simspec/river_files.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/domain_boundary.h"
@@ -151,6 +155,8 @@ void Preprocessor::AddPagesBelow(CYbSEKvfBase& node, ReportPage& parent) {
 bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
   if (&node == catchment_) {
     ShowDomain(page);
+  } else if (dynamic_cast<const RiverFiles*>(&node) || dynamic_cast<const RiverNetworkFile*>(&node)) {
+    ShowRiver(node, page);
   } else if (auto* quantity = dynamic_cast<CData2DKvf*>(&node)) {
     ShowQuantity(*quantity, page);
   } else if (auto* zones = dynamic_cast<CodedZonesKvf*>(&node)) {
@@ -174,6 +180,30 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
 
 void Preprocessor::ShowGrid(ModelGrid grid, ReportPage& page) {
   page.ShowGrid(grids_.Path(), grids_.Add(std::move(grid)));
+}
+
+void Preprocessor::ShowRiver(const CYbSEKvfBase& node, ReportPage& page) {
+  const RiverBranches branches = RiverBranches::Of(node);
+  const RiverReading& river = branches.Reading();
+  const auto cannotShow = [&](const std::string& problem) {
+    log_.Warning(PathOf(node), problem);
+    page.ShowText(problem);
+  };
+  if (!branches.AreKnown()) return cannotShow(river.problem.empty() ? "the river has no branches" : river.problem);
+  for (const RiverFinding& finding : river.findings)
+    log_.Warning(PathOf(node), FindingText(river.network.Path(), finding));
+  CTvnShapeData lines;
+  lines.Create(ShapeKind::Line, {{"NAME", AttributeKind::Text}}, domain_->Geometry().projection);
+  for (const RiverBranch& branch : river.network.branches) {
+    Shape line;
+    for (const RiverPoint& point : branch.points) line.points.push_back(point.place);
+    line.parts = {0};
+    line.values = {branch.name};
+    if (line.points.size() > 1) lines.AddShape(std::move(line));
+  }
+  const std::string path = fmt::format("{}/{}_Rivers.shp", FolderOf(grids_.Path()), BaseNameOf(grids_.Path()));
+  if (const FileResult saved = lines.SaveShapeFile(path); !saved.Ok()) return cannotShow(saved.error);
+  page.ShowShapes(path, BaseUnit(*FindItemType(quantity::kMapCoordinate)).key);
 }
 
 void Preprocessor::ShowDomain(ReportPage& page) {

@@ -47,6 +47,8 @@ class Preprocessor {
   void ShowQuantity(CData2DKvf& quantity, ReportPage& page);
   void ShowZones(CodedZonesKvf& zones, ReportPage& page);
   void ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page);
+  /// The network as lines, which the river model moves the water along.
+  void ShowRiver(const CYbSEKvfBase& node, ReportPage& page);
   /// A constant as text, or a series.
   void ShowSeries(bool isConstant, float value, int itemType, const CFMData0DFile& file, ReportPage& page);
   /// A map of the codes of zones or stations.

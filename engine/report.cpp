@@ -56,6 +56,11 @@ void ReportPage::ShowGrid(const std::string& path, int item) {
   keys = {{"Filename", ReportFile{path}}, {"ItemNo", item}};
 }
 
+void ReportPage::ShowShapes(const std::string& path, int axisUnit) {
+  kind = report_kind::kShapes;
+  keys = {{"Filename", ReportFile{path}}, {"enuAxisUnit", axisUnit}};
+}
+
 void ReportPage::ShowSeries(const std::string& path, int item, const CYbDateTime& start, const CYbDateTime& end) {
   kind = report_kind::kSeries;
   keys = {{"Filename", ReportFile{path}}, {"ItemNo", item}, {"StartDate", start}, {"EndDate", end}};

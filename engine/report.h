@@ -19,6 +19,7 @@ inline constexpr const char* kNothing = "BLANK";
 inline constexpr const char* kSeries = "NDS0_PLOT";
 inline constexpr const char* kGrid = "NDS2_PLOT";
 inline constexpr const char* kText = "TEXT";
+inline constexpr const char* kShapes = "SHAPE_PLOT";
 }  // namespace report_kind
 
 /// A file that a page shows; written relative to the report.
@@ -38,6 +39,8 @@ struct ReportPage {
   /// Lines of text; they may hold line ends.
   void ShowText(const std::string& text);
   void ShowGrid(const std::string& path, int item);
+  /// `axisUnit` is that of the coordinates, one of item 100187.
+  void ShowShapes(const std::string& path, int axisUnit);
   void ShowSeries(const std::string& path, int item, const CYbDateTime& start, const CYbDateTime& end);
 };
 

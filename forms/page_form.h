@@ -87,6 +87,7 @@ class Control {
   int itemType = 0;                                   ///< The number is a quantity of that item type; 0 for none.
   const DisplayUnits* displayUnits = nullptr;         ///< The user's units; null for base units.
   std::function<std::vector<std::string>()> options;  ///< Of a radio group or drop list.
+  std::function<std::vector<std::string>()> offers;   ///< Of a text: what is offered; any other may be typed.
   std::vector<int> optionValues;           ///< What the node stores for each; empty for the options' numbers.
   std::string key;                         ///< Of the node, so that a finding leads here.
   const CYbSEKvfBase* node = nullptr;      ///< That holds the key; null where it changes.
@@ -154,6 +155,8 @@ class Control {
   Control& RevalidatesLater() { return revalidatesLater = true, *this; }
   Control& Hint(int hint_) { return hint = hint_, *this; }
   Control& Then(std::function<int()> then_) { return then = std::move(then_), *this; }
+  /// Texts that are offered for a text; any other may be typed.
+  Control& Offers(std::function<std::vector<std::string>()> texts) { return offers = std::move(texts), *this; }
   Control& Filter(std::string filter) { return fileQuestion.filter = std::move(filter), *this; }
   Control& DefaultExtension(std::string extension) {
     return fileQuestion.defaultExtension = std::move(extension), *this;

@@ -72,6 +72,12 @@ Control& AddRowField(PageForm& form, std::shared_ptr<TableForm> table, std::shar
     return table->Enter(row, *column,
                         column->kind == CellKind::Choice ? OptionValue(*table, *column, row, typed) : typed);
   };
+  // Taken by the column when it has any.
+  if (kind == CellKind::Text)
+    control.options = [table, column] {
+      const int row = table->CurrentRow();
+      return row == 0 || !column->offers ? std::vector<std::string>() : column->offers(row);
+    };
   if (kind == CellKind::Choice)
     control.options = [table, column] {
       const int row = table->CurrentRow();

@@ -179,6 +179,11 @@ bool TableForm::IsGrey(int row, int column) const {
   return !isShownOnly_ && IsReadOnly(row, *shown);
 }
 
+std::vector<std::string> TableForm::Offers(int row, int column) const {
+  const TableColumn* shown = Column(column);
+  return shown && shown->offers && IsThere(row) ? shown->offers(row) : std::vector<std::string>();
+}
+
 CellChoices TableForm::Choices(int row, int column) const {
   const TableColumn* shown = Column(column);
   return shown && IsThere(row) ? Choices(row, *shown) : CellChoices();

@@ -56,6 +56,8 @@ struct TableColumn {
   std::optional<CellKind> kind;     ///< Absent where it follows the value of each row.
   CellChoices choices;              ///< Of a choice, the same in all rows.
   std::function<CellChoices(int row)> rowChoices;  ///< Of a choice that differs from row to row.
+  /// What is offered for a text; any other may be typed.
+  std::function<std::vector<std::string>(int row)> offers;
   /// The value of a cell, or the text of a button.
   std::function<CellValue(int row)> get;
   /// Takes a value of the type that `get` gives; gives why it is refused. Absent where nothing can be changed.
@@ -133,6 +135,7 @@ class TableForm {
   /// Whether the cell stands back behind others because it takes nothing.
   bool IsGrey(int row, int column) const;
   CellChoices Choices(int row, int column) const;
+  std::vector<std::string> Offers(int row, int column) const;
   std::string ToolTip(int row, int column) const;
   std::string Icon(int row, int column) const;
   bool IsLink(int row, int column) const;

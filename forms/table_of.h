@@ -66,6 +66,11 @@ class ColumnOf {
     if (control_) control_->DefaultExtension(extension);
     return column_.fileQuestion.defaultExtension = std::move(extension), *this;
   }
+  /// Texts that are offered for a text, by the row; any other may be typed.
+  ColumnOf& Offers(auto texts) {
+    if (control_) control_->Offers(control_->options);
+    return column_.offers = ByRow<std::vector<std::string>>(std::move(texts)), *this;
+  }
   /// Cells that take nothing stand back on a grey ground.
   ColumnOf& GreyWhen(auto rule) { return column_.readOnly = ByRow<bool>(std::move(rule)), *this; }
   /// Of a button.

@@ -15,6 +15,7 @@
 #include "pages/surface/irrigation_pages.h"
 #include "pages/surface/land_use_pages.h"
 #include "pages/surface/overland_pages.h"
+#include "pages/surface/river_pages.h"
 #include "pages/surface/vegetation_pages.h"
 
 namespace tervane {
@@ -27,11 +28,11 @@ struct PageFile {
   std::span<const PageRow> (*rows)();
 };
 constexpr PageFile kFiles[] = {
-    {"document", DocumentPages},  {"simspec", ComponentsPages},  {"simspec", ControlPages},
-    {"simspec", PeriodPages},     {"spatial", Data2DPages},      {"spatial", DomainPages},
-    {"spatial", StationPages},    {"spatial", ZonePages},        {"surface", ClimatePages},
-    {"surface", LandUsePages},    {"surface", VegetationPages},  {"surface", OverlandPages},
-    {"surface", IrrigationPages}, {"execution", ProcessedPages},
+    {"document", DocumentPages},  {"simspec", ComponentsPages}, {"simspec", ControlPages},
+    {"simspec", PeriodPages},     {"spatial", Data2DPages},     {"spatial", DomainPages},
+    {"spatial", StationPages},    {"spatial", ZonePages},       {"surface", ClimatePages},
+    {"surface", LandUsePages},    {"surface", VegetationPages}, {"surface", OverlandPages},
+    {"surface", IrrigationPages}, {"surface", RiverPages},      {"execution", ProcessedPages},
 };
 
 std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, PageContext context) {

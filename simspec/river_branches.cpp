@@ -3,6 +3,7 @@
 #include "simspec/river_branches.h"
 
 #include <algorithm>
+#include <cmath>
 
 #include <fmt/format.h>
 
@@ -50,7 +51,10 @@ std::string RiverBranches::WhyNoBranch(const std::string& name) const {
 std::string RiverBranches::WhyOutside(const std::string& name, double chainage) const {
   const RiverBranch* branch = reading_->Find(name);
   const auto range = branch ? branch->Chainages() : std::nullopt;
-  if (!range || (chainage >= range->first && chainage <= range->second)) return {};
+  if (!range) return {};
+  // A setup holds chainages in single precision.
+  const double slack = 1e-6 * std::max(std::abs(range->first), std::abs(range->second));
+  if (chainage >= range->first - slack && chainage <= range->second + slack) return {};
   return fmt::format("the chainage {} m lies outside the branch {}, which goes from {} to {} m",
                      ShortestNumber(chainage), name, ShortestNumber(range->first), ShortestNumber(range->second));
 }

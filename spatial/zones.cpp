@@ -4,6 +4,7 @@
 
 #include "platform/item_types.h"
 #include "simspec/conditions.h"
+#include "simspec/river_branches.h"
 #include "spatial/pages.h"
 
 namespace tervane {
@@ -12,6 +13,20 @@ void CSubcatchmentRiverlinkItemKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Branchname", Branchname);
   keys("Upstream", Upstream).Quantity(quantity::kChainage);
   keys("Downstream", Downstream).Quantity(quantity::kChainage);
+}
+
+int CSubcatchmentRiverlinkItemKvf::ValidateData() {
+  // The network may still be made, so that what it lacks is no error.
+  const RiverBranches branches = RiverBranches::Of(*this);
+  if (const std::string why = branches.WhyNoBranch(Branchname); !why.empty()) {
+    AddWarning("The river link leads to no branch", "Branchname", why);
+    return 1;
+  }
+  const std::pair<const char*, float> ends[] = {{"Upstream", Upstream}, {"Downstream", Downstream}};
+  for (const auto& [key, chainage] : ends)
+    if (const std::string why = branches.WhyOutside(Branchname, static_cast<double>(chainage)); !why.empty())
+      AddWarning("The river link leaves its branch", key, why);
+  return 1;
 }
 
 CSubcatchmentRiverlinksListKvf::CSubcatchmentRiverlinksListKvf(const bool& useDefaults, CYbSEKvfBase* parent)

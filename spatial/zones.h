@@ -23,6 +23,8 @@ class CSubcatchmentRiverlinkItemKvf : public CTvnKvfBase {
   float Upstream = 0;    ///< Chainage.
   float Downstream = 0;  ///< Chainage.
 
+  int ValidateData() override;
+
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };

@@ -32,13 +32,14 @@ bool HasExtension(const FileName& file, std::string_view extension) {
 // ---- With the own engine
 
 CRiverKvf::CRiverKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Rivers and Lakes", "River", parent) {
+  SetPage(kRiverPage);
   TakesPartWhen(OwnEngine() && Component(&CModelCompKvf::River));
   NewChild<CData2DKvf>(kFloodCodes, OnInParent(&CRiverKvf::FloodCodes));
   NewChild<CData2DKvf>(kBathymetry, OnInParent(&CRiverKvf::Bathymetry));
 }
 
 void CRiverKvf::ExchangeKeys(KeyExchange& keys) {
-  keys("Filename", filename_);
+  keys("Filename", Filename);
   keys("FilenameWQ", FilenameWQ);
   keys("Bathymetry", Bathymetry);
   keys("FloodCodes", FloodCodes);
@@ -46,15 +47,15 @@ void CRiverKvf::ExchangeKeys(KeyExchange& keys) {
 
 void CRiverKvf::SetRiverFile(FileName file) {
   // A project file leads to no network for them.
-  if (HasExtension(file, ".fvproj") && HasExtension(filename_, ".fvsim"))
+  if (HasExtension(file, ".fvproj") && HasExtension(Filename, ".fvsim"))
     for (const auto& layers : {kRiversInForeground, kRiversInBackground})
       if (auto* followers = Important(layers)) followers->StayWithRivers();
-  filename_ = std::move(file);
+  Filename = std::move(file);
 }
 
 int CRiverKvf::ValidateData() {
-  if (const std::string problem = WhyNotReadable(filename_.Absolute()); !problem.empty()) {
-    AddError("Fvr simulation file (*.FVSIM) is missing", "Filename", filename_.IsEmpty() ? std::string() : problem);
+  if (const std::string problem = WhyNotReadable(Filename.Absolute()); !problem.empty()) {
+    AddError("Fvr simulation file (*.FVSIM) is missing", "Filename", Filename.IsEmpty() ? std::string() : problem);
     return 0;
   }
   return 1;
@@ -63,6 +64,7 @@ int CRiverKvf::ValidateData() {
 // ---- With Modflow
 
 CRiverMFKvf::CRiverMFKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Rivers and Lakes", "RiverMF", parent) {
+  SetPage(kModflowRiverPage);
   TakesPartWhen(!OwnEngine() && ModflowComponent(&CModModelCompKvf::River));
 }
 

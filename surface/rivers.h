@@ -18,12 +18,13 @@ class CRiverKvf : public CYbSEKvfBase, public RiverFiles {
  public:
   explicit CRiverKvf(CYbSEKvfBase* parent);
 
-  FileName FilenameWQ;  ///< The river simulation file for water quality.
+  FileName Filename;    ///< The river simulation file; changed by `SetRiverFile` alone.
+  FileName FilenameWQ;  ///< The same for water quality.
   // Areas that are flooded.
   int Bathymetry = 0;
   int FloodCodes = 0;
 
-  const FileName& GetFilename() const override { return filename_; }
+  const FileName& GetFilename() const override { return Filename; }
   const FileName& GetFilenameWQ() const override { return FilenameWQ; }
   /// Takes another river simulation file. Maps that draw the setup's rivers go on drawing the network of the old one
   /// where a project takes the place of a simulation.
@@ -33,9 +34,6 @@ class CRiverKvf : public CYbSEKvfBase, public RiverFiles {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
-
- private:
-  FileName filename_;
 };
 
 /// With a Modflow engine: a river network.

@@ -10,6 +10,7 @@
 #include <fmt/format.h>
 
 #include "overlays/overlays.h"
+#include "pages/parts/river_map.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
 #include "simspec/periods.h"
@@ -122,12 +123,15 @@ std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item
   });
 }
 
-/// Grids and shapes of a list of layers that are shown.
+/// Grids, shapes and rivers of a list of layers that are shown.
 void AddLayers(const COverlayListKvf& list, MapContent& map) {
   for (int number = 1; number <= list.GetItemCount(); ++number) {
     const COverlayItemKvf& item = *list.GetItem(number);
     const OverlayLayer* layer = item.Layer();
-    if (!layer || !layer->Display || layer->LayerFile().IsEmpty()) continue;
+    if (!layer || !layer->Display) continue;
+    const auto* river = dynamic_cast<const COverlayRiverKvf*>(layer);
+    if (river) AddRiver(map, river->DrawnFile());
+    if (river || layer->LayerFile().IsEmpty()) continue;
     if (const auto* grid = dynamic_cast<const COverlayGridKvf*>(layer)) {
       GridLayer drawn;
       drawn.grid = NowOrAwaited(RecentGrid(grid->LayerFile().Absolute(), grid->GridFile().SelectedItem()), map.awaited);

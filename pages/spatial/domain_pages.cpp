@@ -2,14 +2,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/spatial/domain_pages.h"
 
-#include <algorithm>
-#include <iterator>
-
 #include "forms/map_question.h"
 #include "geometry/cart.h"
 #include "pages/parts/create_dialogs.h"
+#include "pages/parts/domain_map.h"
 #include "pages/parts/file_controls.h"
-#include "pages/parts/plot_content.h"
 #include "platform/files.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
@@ -36,7 +33,6 @@ class CCatchmentDlg : public PageOf<CCatchmentKvf> {
   /// Takes a shape file with the unit of its coordinates, which is asked for; false when the user gave up.
   bool TakeShape(Host& host, const FileName& file);
   MapContent Map();
-  MapContent DomainMap();
 
   MapQuestion question_;
 };
@@ -161,27 +157,8 @@ void CCatchmentDlg::Describe(PageForm& form) {
 }
 
 MapContent CCatchmentDlg::Map() {
-  MapContent map = DomainMap();
+  MapContent map = DomainMap(Node());
   question_.PutOn(map);
-  return map;
-}
-
-MapContent CCatchmentDlg::DomainMap() {
-  CCatchmentKvf& n = Node();
-  if (n.Type == CCatchmentKvf::kGridFile) {
-    MapContent map = FileMap(n.GridFile());
-    if (!map.grids.empty()) {
-      map.grids.front().isCodes = true;
-      map.grids.front().withLegend = false;
-    }
-    return map;
-  }
-  if (n.ShapeFile().File.IsEmpty()) return GridMap(n, nullptr, "No file is chosen.");
-  MapContent map = GridMap(n, n.DomainFromShape());
-  if (!map.grids.empty()) map.grids.front().isCodes = true;
-  MapContent outline = ShapeFileMap(n.ShapeFile(), n.ShapeAxisUnit);
-  std::ranges::move(outline.shapes, std::back_inserter(map.shapes));
-  std::ranges::move(outline.awaited, std::back_inserter(map.awaited));
   return map;
 }
 

@@ -14,6 +14,7 @@
 
 #include "shell/page/table_view.h"
 #include "shell/widgets/date_entry.h"
+#include "shell/widgets/offered_texts.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -29,6 +30,7 @@ QWidget* CellDelegate::createEditor(QWidget* parent, const QStyleOptionViewItem&
   edit->setFrame(false);
   if (kind == CellKind::File) AddBrowseButton(edit, index);
   if (kind == CellKind::Date) AddCalendarButton(edit);
+  if (kind == CellKind::Text && model_.Table().Column(index.column() + 1)->offers) AddOffers(edit, index);
   return edit;
 }
 
@@ -68,6 +70,18 @@ void CellDelegate::AddCalendarButton(QLineEdit* edit) const {
       });
   connect(button, &QAction::triggered, calendar,
           [edit, calendar] { calendar->popup(edit->mapToGlobal(QPoint(0, edit->height()))); });
+}
+
+void CellDelegate::AddOffers(QLineEdit* edit, const QModelIndex& index) const {
+  const auto offered = [this, cell = QPersistentModelIndex(index)] {
+    QStringList texts;
+    for (const std::string& text : model_.Table().Offers(cell.row() + 1, cell.column() + 1)) texts << ToQt(text);
+    return texts;
+  };
+  OfferTexts(*edit, offered, [this, edit] {
+    auto* self = const_cast<CellDelegate*>(this);
+    if (self->Take(edit)) self->Close(edit);
+  });
 }
 
 void CellDelegate::setEditorData(QWidget* editor, const QModelIndex& index) const {

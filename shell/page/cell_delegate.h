@@ -44,6 +44,7 @@ class CellDelegate : public QStyledItemDelegate {
   QWidget* NewChoiceList(QWidget* parent, const QModelIndex& index) const;
   void AddBrowseButton(QLineEdit* edit, const QModelIndex& index) const;
   void AddCalendarButton(QLineEdit* edit) const;
+  void AddOffers(QLineEdit* edit, const QModelIndex& index) const;
   /// Hands the text of a line over; false when it was refused, and then stays in it.
   bool Take(QLineEdit* edit);
   void Close(QWidget* editor);

@@ -13,6 +13,7 @@
 
 #include "shell/page/control_widgets.h"
 #include "shell/widgets/date_entry.h"
+#include "shell/widgets/offered_texts.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -47,6 +48,9 @@ class LineWidget : public ControlWidget {
       row->insertWidget(1, browse);
       connect(browse, &QToolButton::clicked, this, &LineWidget::Browse);
     }
+    if (control.offers)
+      OfferTexts(
+          *edit_, [this] { return Offered(); }, [this] { Enter(edit_->text()); });
     connect(edit_, &QLineEdit::editingFinished, this, &LineWidget::Commit);
     connect(edit_, &QLineEdit::textEdited, this, [this] { edited_ = true; });
   }
@@ -113,6 +117,11 @@ class LineWidget : public ControlWidget {
       default:
         return kTextWidth;
     }
+  }
+  QStringList Offered() const {
+    QStringList texts;
+    for (const std::string& text : Described().offers()) texts << ToQt(text);
+    return texts;
   }
   /// Counts the part of the date in which the cursor stands.
   bool StepDate(int by) {

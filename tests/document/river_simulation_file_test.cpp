@@ -58,8 +58,8 @@ target SYSTEM {
 TEST(RiverSimulationFile, IsLeftAloneWhenItHasTheLocationAlready) {
   const TempFolder folder;
   const std::string location =
-      "target SYSTEM { ProjectResultRoot = file \"/runs\"\nUseCustomResultFolder = 0\nCustomResultFolder = file \"\" "
-      "}\n";
+      "target SYSTEM {\nProjectResultRoot = file \"/runs\"\nUseCustomResultFolder=0\n"
+      "CustomResultFolder = file \"\"\n}\n";
   const std::string own = location + "# own layout\ntarget FvRun {\nA=1\n}\n";
   const std::string path = folder.Write("river.fvsim", own);
   std::string error;

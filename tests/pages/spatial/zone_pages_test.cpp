@@ -7,6 +7,7 @@
 #include "platform/item_types.h"
 #include "simspec/model_components.h"
 #include "spatial/zones.h"
+#include "surface/rivers.h"
 #include "tests/support/data_files.h"
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
@@ -76,6 +77,45 @@ TEST_F(ZonePage, ZonesThatHoldWorkGoOnlyWhenTheUserSaysSo) {
   page.Enter("Grid Distribution File:", folder.File("others.nds2"));
   EXPECT_THAT(Titles(), ElementsAre("Grid code = 2", "Grid code = 3"));
   EXPECT_TRUE(page.Outside().IsDone());
+}
+
+TEST_F(ZonePage, LinksAreTakenFromTheBranchesThatCrossTheZone) {
+  WriteGrid("codes.nds2", {1, 2}, quantity::kCode);
+  test::PageDriver parent(document, "Subcatchments");
+  ASSERT_EQ(parent.Enter("Grid Distribution File:", folder.File("codes.nds2")), "");
+  test::PageDriver page(document, "Subcatchments/Subcatchment#2/Riverlinks");
+  const auto hasNetwork = [&] { return page.Find("Links from Network").IsEnabled(); };
+  EXPECT_FALSE(hasNetwork());
+  document.Root().Important(kModelComponents)->SZ_ModelType = kLinearReservoir;
+  dynamic_cast<CSubcatchmentPropKvf&>(*page.Page().Node().GetParent()).DefaultRiverLinks = false;
+  folder.Write("net.fvnwk",
+               "target FLUVANE_Network_editor {\n  section POINTS {\n    Point = 1, -50, 50, 1000\n"
+               "    Point = 2, 250, 50, 1300\n  }\n  section BRANCHES {\n    section Branch_1 {\n"
+               "      Name = \"Rhone\"\n      Points = 1, 2\n    }\n  }\n}\n");
+  const std::string simulation =
+      folder.Write("run.fvsim", "target FvRun {\n  section input {\n    nwk = \"net.fvnwk\"\n  }\n}\n");
+  dynamic_cast<CRiverKvf&>(*document.Root().Important(kRiver)).SetRiverFile(FileName(simulation, ""));
+  EXPECT_TRUE(hasNetwork());
+  page.Page().Press(page.Find("Links from Network"));
+  auto& links = dynamic_cast<CSubcatchmentRiverlinksListKvf&>(page.Page().Node());
+  ASSERT_EQ(links.GetItemCount(), 1);
+  auto& link = *links.GetItem(1);
+  EXPECT_EQ(link.Branchname, "Rhone");
+  EXPECT_EQ(link.Upstream, 1150);
+  EXPECT_EQ(link.Downstream, 1250);
+  EXPECT_THAT(page.Changes(), ElementsAre("15 Links from Network"));
+  // Its branches are offered; another name stays, with a warning.
+  TableForm& table = *page.Page().Form().Controls().front()->table;
+  EXPECT_THAT(table.Offers(1, 1), ElementsAre("Rhone"));
+  EXPECT_EQ(page.Page().EnterCell(*page.Page().Form().Controls().front(), 1, 1, "Danube"), "");
+  link.Validate();
+  ASSERT_EQ(link.Findings().size(), 1U);
+  EXPECT_EQ(link.Findings()[0].severity, Severity::Warning);
+  link.Branchname = "Rhone";
+  link.Downstream = 1301;
+  link.Validate();
+  ASSERT_EQ(link.Findings().size(), 1U);
+  EXPECT_EQ(link.Findings()[0].key, "Downstream");
 }
 
 }  // namespace

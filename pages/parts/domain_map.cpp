@@ -1,0 +1,33 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/parts/domain_map.h"
+
+#include <algorithm>
+#include <iterator>
+
+#include "pages/parts/plot_content.h"
+#include "spatial/domain.h"
+
+namespace tervane {
+
+MapContent DomainMap(const CYbSEKvfBase& node) {
+  auto* domain = node.Important(kDomain);
+  if (!domain) return {};
+  if (domain->Type == CCatchmentKvf::kGridFile) {
+    MapContent map = FileMap(domain->GridFile());
+    if (!map.grids.empty()) {
+      map.grids.front().isCodes = true;
+      map.grids.front().withLegend = false;
+    }
+    return map;
+  }
+  if (domain->ShapeFile().File.IsEmpty()) return GridMap(node, nullptr, "No file is chosen.");
+  MapContent map = GridMap(node, domain->DomainFromShape());
+  if (!map.grids.empty()) map.grids.front().isCodes = true;
+  MapContent outline = ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
+  std::ranges::move(outline.shapes, std::back_inserter(map.shapes));
+  std::ranges::move(outline.awaited, std::back_inserter(map.awaited));
+  return map;
+}
+
+}  // namespace tervane
