@@ -54,8 +54,9 @@ std::shared_ptr<CYbSEKvfBase> CYbSEKvfBase::RemoveChild(CYbSEKvfBase* child) {
 void CYbSEKvfBase::SwapChilds(CYbSEKvfBase* a, CYbSEKvfBase* b) {
   const std::ptrdiff_t placeA = IndexOfChild(a);
   const std::ptrdiff_t placeB = IndexOfChild(b);
-  if (placeA >= 0 && placeB >= 0)
-    std::swap(children_[static_cast<std::size_t>(placeA)], children_[static_cast<std::size_t>(placeB)]);
+  if (placeA < 0 || placeB < 0) return;
+  std::swap(children_[static_cast<std::size_t>(placeA)], children_[static_cast<std::size_t>(placeB)]);
+  std::swap(a->placeHint_, b->placeHint_);
 }
 
 CYbSEKvfBase* CYbSEKvfBase::GetNextChild(const CYbSEKvfBase* child) const {

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <array>
 #include <cstdlib>
+#include <ranges>
 #include <unordered_map>
 #include <unordered_set>
 
@@ -65,7 +66,8 @@ bool IsEdited(CFMSEKvfBase& owner, CFMSEKvfGroupBase& item) {
 }
 
 void RemoveAll(CFMSEKvfBase& owner, const std::vector<CFMSEKvfGroupBase*>& items) {
-  for (CFMSEKvfGroupBase* item : items) owner.RemoveChild(item);
+  // From the back, where the fewest children must move up.
+  for (CFMSEKvfGroupBase* item : std::views::reverse(items)) owner.RemoveChild(item);
 }
 
 /// Sorts the items by their identities; true when they were not in order.
