@@ -34,32 +34,6 @@ using GridData = CTvn2DOrthoRotatedGridData;
 
 CYbDateTime DateAt(std::int64_t seconds) { return CYbDateTime::FromSecondsSinceEpoch(seconds); }
 
-/// For each cell of the domain the place of the cell of another grid in which its centre lies; -1 off that grid.
-std::vector<std::ptrdiff_t> PlacesOf(const GridData& domain, const GridGeometry& grid) {
-  const GridTransform own(grid);
-  const GridGeometry& cells = domain.Geometry();
-  std::vector<std::ptrdiff_t> places;
-  for (int j = 0; j < cells.ny; ++j) {
-    for (int i = 0; i < cells.nx; ++i) {
-      if (domain.IsEmptyValue(domain.Value(i, j))) continue;
-      const MapPoint at = own.ToCells(domain.CellCentre(i, j));
-      const bool isInside = at.x >= 0 && at.y >= 0 && at.x < grid.nx && at.y < grid.ny;
-      places.push_back(isInside ? static_cast<std::ptrdiff_t>(at.y) * grid.nx + static_cast<std::ptrdiff_t>(at.x) : -1);
-    }
-  }
-  return places;
-}
-
-/// The values of a grid in the cells of the domain; nothing where there is none.
-std::vector<std::optional<float>> ValuesIn(const GridData& domain, const GridData& grid) {
-  std::vector<std::optional<float>> values;
-  for (const std::ptrdiff_t place : PlacesOf(domain, grid.Geometry())) {
-    const float value = place < 0 ? grid.DeleteValue() : grid.Values()[static_cast<std::size_t>(place)];
-    values.push_back(grid.IsEmptyValue(value) ? std::nullopt : std::optional(value));
-  }
-  return values;
-}
-
 /// A step of a file of grids, as a mean over the domain.
 class DomainMeans {
  public:
@@ -109,13 +83,6 @@ class DomainMeans {
   std::vector<std::ptrdiff_t> places_;  ///< Of each cell of the domain in the file's grid; -1 off it.
   std::vector<float> values_;
   std::string problem_;  ///< Why the file's cells are no grid of a model.
-};
-
-/// Codes of the areas of stations or zones, over the cells of the domain.
-struct AreaCells {
-  std::map<std::string, std::size_t> cellsOfId;
-  std::size_t withoutId = 0;
-  std::string problem;
 };
 
 class CoverageBuilder {
@@ -171,7 +138,6 @@ class CoverageBuilder {
 
   ForcingTotals MakeForcing(const CoverageForcing& forcing);
   void AddDomainColumn(ForcingTotals& totals);
-  AreaCells CellsOf(const GridSource& areas);
 
   std::vector<TimeSpan> Spans() const {
     std::vector<TimeSpan> spans;
@@ -212,15 +178,8 @@ void CoverageBuilder::MakeDomain() {
     board_.domainCells = previous_->domainCells;
     return;
   }
-  const DomainSource& source = board_.request.domain;
-  if (source.file.empty() || !source.geometry) {
-    board_.domainProblem = source.file.empty() ? "no file is chosen" : DataFileFactsOf(source.file)->error;
-    return;
-  }
   auto grid = std::make_shared<GridData>();
-  const FileResult result =
-      source.isShape ? grid->MakeCatchmentGriddataFromShapefile(source.file, source.axisUnit, *source.geometry, part_)
-                     : ReadGridData(source.file, source.item, *grid, part_);
+  const FileResult result = ReadDomain(board_.request.domain, part_, *grid);
   LeaveIfCancelled();
   board_.domainProblem = result.error;
   if (!result.Ok()) return;
@@ -454,9 +413,11 @@ ForcingTotals CoverageBuilder::MakeForcing(const CoverageForcing& asked) {
 
 void CoverageBuilder::AddDomainColumn(ForcingTotals& totals) {
   if (!board_.domain || board_.domainCells == 0) return;
-  AreaCells areas = CellsOf(*totals.forcing.forcing.areas);
-  if (!areas.problem.empty()) {
-    totals.remarks.push_back({Severity::Error, areas.problem, {}, {}});
+  AreaCells areas;
+  const FileResult counted = CountCells(*board_.domain, *totals.forcing.forcing.areas, part_, areas);
+  LeaveIfCancelled();
+  if (!counted.Ok()) {
+    totals.remarks.push_back({Severity::Error, counted.error, {}, {}});
     return;
   }
   ForcingTotals::Column mean;
@@ -501,34 +462,6 @@ void CoverageBuilder::AddDomainColumn(ForcingTotals& totals) {
                               {}});
   // Of many stations the mean is looked for first.
   totals.columns.insert(totals.columns.begin(), std::move(mean));
-}
-
-AreaCells CoverageBuilder::CellsOf(const GridSource& source) {
-  AreaCells cells;
-  GridData grid;
-  ZoneTable zones;
-  FileResult result;
-  const bool isPolygons = source.type == CData2DKvf::kShapeFile;
-  if (isPolygons) {
-    const PolygonFile polygons{source.file, source.attribute, source.gapFill, source.axisUnit};
-    result = grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, zones, part_);
-  } else {
-    result = ReadGridData(source.file, source.item, grid, part_);
-  }
-  LeaveIfCancelled();
-  cells.problem = result.error;
-  if (!result.Ok()) return cells;
-  std::map<int, std::string> idOfCode;
-  for (const ZoneTable::Zone& zone : zones.zones) idOfCode[zone.code] = zone.text;
-  for (const std::optional<float>& value : ValuesIn(*board_.domain, grid)) {
-    if (!value) {
-      ++cells.withoutId;
-      continue;
-    }
-    const int code = static_cast<int>(std::lround(*value));
-    ++cells.cellsOfId[isPolygons ? idOfCode[code] : std::to_string(code)];
-  }
-  return cells;
 }
 
 }  // namespace

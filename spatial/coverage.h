@@ -15,6 +15,7 @@
 #include "geometry/grid.h"
 #include "platform/progress.h"
 #include "spatial/data_use.h"
+#include "spatial/domain_cells.h"
 #include "spatial/series_totals.h"
 
 namespace tervane {
@@ -40,18 +41,6 @@ struct CoverageForcing {
   Forcing forcing;
 
   bool operator==(const CoverageForcing&) const = default;
-};
-
-/// Where the domain is read from.
-struct DomainSource {
-  bool isShape = false;
-  std::string file;
-  std::vector<FileStamp> stamps;
-  int item = 1;
-  int axisUnit = 1000;
-  std::optional<GridGeometry> geometry;  ///< Nothing while it cannot be read.
-
-  bool operator==(const DomainSource&) const = default;
 };
 
 struct CoverageRequest {

@@ -7,8 +7,6 @@
 #include "simspec/periods.h"
 #include "spatial/coverage.h"
 #include "spatial/data2d.h"
-#include "spatial/domain.h"
-#include "spatial/placement.h"
 #include "spatial/zone_sync.h"
 
 namespace tervane {
@@ -23,20 +21,6 @@ std::string TitleOf(const CYbSEKvfBase& node) {
   const std::string& name = shown->GetAbbreviatedTitle();
   const bool isOneOfMany = dynamic_cast<const CFMSEKvfGroupBase*>(shown) != nullptr;
   return isOneOfMany && !name.empty() ? fmt::format("{}: {}", name, shown->GetTitle()) : shown->GetTitle();
-}
-
-DomainSource DomainOf(const CYbSEKvfBase& root) {
-  DomainSource source;
-  const auto* domain = root.Important(kDomain);
-  if (!domain) return source;
-  source.isShape = domain->Type == CCatchmentKvf::kShapeFile;
-  const FileName& file = source.isShape ? domain->ShapeFile().File : domain->GridFile().File;
-  source.file = file.IsEmpty() ? std::string() : file.Absolute();
-  source.stamps = StampsOfShape(source.file);
-  source.item = domain->GridFile().SelectedItem();
-  source.axisUnit = domain->ShapeAxisUnit;
-  source.geometry = DomainGeometryOf(root);
-  return source;
 }
 
 std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
@@ -87,7 +71,7 @@ void AddRequestsBelow(const CYbSEKvfBase& node, WalkedNode& place, CoverageReque
 CoverageRequest AskCoverage(CYbSEKvfBase& root) {
   CoverageRequest request;
   request.simulation = SimulationOf(root);
-  request.domain = DomainOf(root);
+  request.domain = AskDomain(root);
   WalkedNode place(root);
   AddRequestsBelow(root, place, request);
   return request;

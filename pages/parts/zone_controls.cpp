@@ -187,15 +187,18 @@ void PlaceOfZone(PageForm& form, const CodedZoneProp& zone) {
   });
 }
 
-void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words) {
+void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words,
+                   ZoneAreaTable& areas) {
   const auto sync = [&page, &zones] { return SyncWithSource(page.Outside(), zones); };
   if (zones.Kind().distribution) form.Choice("Spatial Distribution:", zones.DistributionType).Then(sync);
   Control& type = form.Choice("Data Type:", zones.Type).Then(sync);
   if (!words.isTypeAlwaysShown) type.ShownWhen(zones.InForce());
   DescribeZoneSource(form, page, zones, words);
-  form.Map([&page, &zones] {
+  areas.Describe(form, page);
+  form.Map([&page, &zones, &areas] {
         MapContent map = ZoneMap(zones, nullptr);
         GoToPickedZone(map, page, zones);
+        if (areas.Follow(map.awaited) && page.Context().syncSoon) page.Context().syncSoon();
         return map;
       })
       .ShownWhen(zones.InForce());

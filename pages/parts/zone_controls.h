@@ -10,6 +10,7 @@
 #include "forms/page_rows.h"
 #include "forms/plots.h"
 #include "pages/parts/file_controls.h"
+#include "pages/parts/zone_area_table.h"
 #include "spatial/zones.h"
 
 namespace tervane {
@@ -51,7 +52,8 @@ const CodedZonesKvf* ZonesOf(const CodedZoneProp& zone);
 void PlaceOfZone(PageForm& form, const CodedZoneProp& zone);
 
 /// All controls of a parent of zones.
-void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words);
+void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words,
+                   ZoneAreaTable& areas);
 
 /// The page of a parent of zones: `PageIs<ZonesPage<kWords>, CodedZonesKvf>(kPage)`.
 template <const ZoneSourceWords& words>
@@ -62,7 +64,10 @@ class ZonesPage : public PageOf<CodedZonesKvf> {
   void OnRefresh() override { RefreshZones(*this, Node(), "Refresh Zones"); }
 
  protected:
-  void Describe(PageForm& form) override { DescribeZones(form, *this, Node(), words); }
+  void Describe(PageForm& form) override { DescribeZones(form, *this, Node(), words, areas_); }
+
+ private:
+  ZoneAreaTable areas_{Node()};
 };
 
 }  // namespace tervane

@@ -1,0 +1,108 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "spatial/domain_cells.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "data/datafile_facts.h"
+#include "data/grid_files.h"
+#include "geometry/grid_polygons.h"
+#include "geometry/shapes.h"
+#include "spatial/data2d.h"
+#include "spatial/domain.h"
+#include "spatial/placement.h"
+
+namespace tervane {
+
+namespace {
+
+using GridData = CTvn2DOrthoRotatedGridData;
+
+std::size_t CountInside(const GridData& grid) {
+  return static_cast<std::size_t>(
+      std::ranges::count_if(grid.Values(), [&](float value) { return !grid.IsEmptyValue(value); }));
+}
+
+}  // namespace
+
+DomainSource AskDomain(const CYbSEKvfBase& root) {
+  DomainSource source;
+  const auto* domain = root.Important(kDomain);
+  if (!domain) return source;
+  source.isShape = domain->Type == CCatchmentKvf::kShapeFile;
+  const FileName& file = source.isShape ? domain->ShapeFile().File : domain->GridFile().File;
+  source.file = file.IsEmpty() ? std::string() : file.Absolute();
+  source.stamps = StampsOfShape(source.file);
+  source.item = domain->GridFile().SelectedItem();
+  source.axisUnit = domain->ShapeAxisUnit;
+  source.geometry = DomainGeometryOf(root);
+  return source;
+}
+
+FileResult ReadDomain(const DomainSource& source, ProgressPart progress, GridData& grid) {
+  if (source.file.empty()) return {"no file is chosen", {}};
+  if (!source.geometry) return {DataFileFactsOf(source.file)->error, {}};
+  return source.isShape
+             ? grid.MakeCatchmentGriddataFromShapefile(source.file, source.axisUnit, *source.geometry, progress)
+             : ReadGridData(source.file, source.item, grid, progress);
+}
+
+std::vector<std::ptrdiff_t> PlacesOf(const GridData& domain, const GridGeometry& grid) {
+  const GridTransform own(grid);
+  const GridGeometry& cells = domain.Geometry();
+  std::vector<std::ptrdiff_t> places;
+  for (int j = 0; j < cells.ny; ++j) {
+    for (int i = 0; i < cells.nx; ++i) {
+      if (domain.IsEmptyValue(domain.Value(i, j))) continue;
+      const MapPoint at = own.ToCells(domain.CellCentre(i, j));
+      const bool isInside = at.x >= 0 && at.y >= 0 && at.x < grid.nx && at.y < grid.ny;
+      places.push_back(isInside ? static_cast<std::ptrdiff_t>(at.y) * grid.nx + static_cast<std::ptrdiff_t>(at.x) : -1);
+    }
+  }
+  return places;
+}
+
+std::vector<std::optional<float>> ValuesIn(const GridData& domain, const GridData& grid) {
+  std::vector<std::optional<float>> values;
+  for (const std::ptrdiff_t place : PlacesOf(domain, grid.Geometry())) {
+    const float value = place < 0 ? grid.DeleteValue() : grid.Values()[static_cast<std::size_t>(place)];
+    values.push_back(grid.IsEmptyValue(value) ? std::nullopt : std::optional(value));
+  }
+  return values;
+}
+
+FileResult CountCells(const GridData& domain, const GridSource& areas, ProgressPart progress, AreaCells& cells) {
+  GridData grid;
+  ZoneTable zones;
+  const bool isPolygons = areas.type == CData2DKvf::kShapeFile;
+  const PolygonFile polygons{areas.file, areas.attribute, areas.gapFill, areas.axisUnit};
+  FileResult result =
+      isPolygons ? grid.CreateGridData_GIS_Polygon(areas.geometry, kUsualDeleteValue, polygons, zones, progress)
+                 : ReadGridData(areas.file, areas.item, grid, progress);
+  if (!result.Ok()) return result;
+  std::map<int, std::string> idOfCode;
+  for (const ZoneTable::Zone& zone : zones.zones) idOfCode[zone.code] = zone.text;
+  for (const std::optional<float>& value : ValuesIn(domain, grid)) {
+    if (!value) {
+      ++cells.withoutId;
+      continue;
+    }
+    const int code = static_cast<int>(std::lround(*value));
+    ++cells.cellsOfId[isPolygons ? idOfCode[code] : std::to_string(code)];
+  }
+  return result;
+}
+
+FileResult ComputeZoneAreas(const DomainSource& domain, const GridSource& zones, ProgressPart progress,
+                            ZoneAreas& areas) {
+  GridData grid;
+  if (FileResult read = ReadDomain(domain, progress.Part(0, 0.5), grid); !read.Ok())
+    return {"The model domain cannot be read: " + read.error, {}};
+  areas.cells = {};
+  areas.allCells = CountInside(grid);
+  areas.cellArea = grid.Geometry().cellSize * grid.Geometry().cellSize;
+  return CountCells(grid, zones, progress.Part(0.5, 1), areas.cells);
+}
+
+}  // namespace tervane

@@ -1,0 +1,59 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What lies in the cells of the model domain: values of other grids, and how many of the cells each zone or station
+// area has. All works on copies of values, so that another thread may do it.
+#pragma once
+
+#include <cstddef>
+#include <map>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "core/node.h"
+#include "geometry/grid.h"
+#include "platform/progress.h"
+#include "spatial/data_use.h"
+
+namespace tervane {
+
+/// Where the domain is read from.
+struct DomainSource {
+  bool isShape = false;
+  std::string file;
+  std::vector<FileStamp> stamps;
+  int item = 1;
+  int axisUnit = 1000;
+  std::optional<GridGeometry> geometry;  ///< Nothing while it cannot be read.
+
+  bool operator==(const DomainSource&) const = default;
+};
+DomainSource AskDomain(const CYbSEKvfBase& root);
+/// Reads the grid of the domain.
+FileResult ReadDomain(const DomainSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid);
+
+/// For each cell of the domain the place of the cell of another grid in which its centre lies; -1 off that grid.
+std::vector<std::ptrdiff_t> PlacesOf(const CTvn2DOrthoRotatedGridData& domain, const GridGeometry& grid);
+/// The values of a grid in the cells of the domain; nothing where there is none.
+std::vector<std::optional<float>> ValuesIn(const CTvn2DOrthoRotatedGridData& domain,
+                                           const CTvn2DOrthoRotatedGridData& grid);
+
+/// The cells of the domain by the zone or station area that they belong to.
+struct AreaCells {
+  std::map<std::string, std::size_t> cellsOfId;
+  std::size_t withoutId = 0;
+};
+FileResult CountCells(const CTvn2DOrthoRotatedGridData& domain, const GridSource& areas, ProgressPart progress,
+                      AreaCells& cells);
+
+/// The same with the domain read first, and how large a cell is.
+struct ZoneAreas {
+  AreaCells cells;
+  std::size_t allCells = 0;
+  double cellArea = 0;  ///< Square metres.
+};
+FileResult ComputeZoneAreas(const DomainSource& domain, const GridSource& zones, ProgressPart progress,
+                            ZoneAreas& areas);
+
+}  // namespace tervane
