@@ -4,6 +4,7 @@
 
 #include "platform/item_types.h"
 #include "simspec/conditions.h"
+#include "simspec/river_branches.h"
 #include "surface/land_use.h"
 #include "surface/pages.h"
 
@@ -84,6 +85,21 @@ CIrrCommandAreasPropSourceItemKvf::CIrrCommandAreasPropSourceItemKvf(CYbSEKvfBas
 void CIrrCommandAreasPropSourceItemKvf::SetShownApplication(int application) {
   DirectApplication = application == kSheet ? kOnSheet : kDirect;
   WaterApplication = application == kSheet ? kDrip : application;
+}
+
+int CIrrCommandAreasPropSourceItemKvf::ValidateData() {
+  if (SourceTypeCode != kRiver) return 1;
+  const RiverBranches branches = RiverBranches::Of(*this);
+  if (const std::string why = branches.WhyNoBranch(RiverNameRS); !why.empty()) {
+    AddWarning("The river source leads to no branch", "RiverNameRS", why);
+    return 1;
+  }
+  const std::pair<const char*, float> ends[] = {{"UpstreamChainageRS", UpstreamChainageRS},
+                                                {"DownstreamChainageRS", DownstreamChainageRS}};
+  for (const auto& [key, chainage] : ends)
+    if (const std::string why = branches.WhyOutside(RiverNameRS, static_cast<double>(chainage)); !why.empty())
+      AddWarning("The river source leaves its branch", key, why);
+  return 1;
 }
 
 void CIrrCommandAreasPropSourceItemKvf::ExchangeKeys(KeyExchange& keys) {

@@ -74,6 +74,9 @@ class CIrrCommandAreasPropSourceItemKvf : public CYbSEKvfBase {
   int ShownApplication() const { return DirectApplication == kDirect ? WaterApplication : kSheet; }
   void SetShownApplication(int application);
 
+  /// Warns of a reach that the river network does not have.
+  int ValidateData() override;
+
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 

@@ -10,12 +10,12 @@ void ZoneAreaTable::Describe(PageForm& form, const CYbSEDlgBase& page) {
   if (!zones_.HasZones()) return;
   auto table = std::make_shared<TableOf<Row>>(rows_);
   table->ShowOnly();
-  table->Value("Zone", [](const Row& row) { return row.name; }).Width(180).Link([this, &page](const Row& row) {
+  table->Value("Zone", [](const Row& row) { return row.name; }).Width(140).Link([this, &page](const Row& row) {
     const CFMSEKvfGroupBase* zone = zones_.SelectZoneByName(row.id);
     if (zone && page.Context().selectNode) page.Context().selectNode(*zone);
   });
-  table->Value("Code", [](const Row& row) { return row.id; }).Width(70);
-  table->Value("Area", [](const Row& row) { return row.area; }).Width(90).Unit("km²").Format("%.6g");
+  table->Value("Code", [](const Row& row) { return row.id; }).Width(60);
+  table->Value("Area", [](const Row& row) { return row.area; }).Width(80).Unit("km²").Format("%.6g");
   table->Value("Share", [](const Row& row) { return row.share; })
       .Width(80)
       .Unit("%")

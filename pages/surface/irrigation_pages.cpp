@@ -11,9 +11,13 @@
 #include "forms/row_fields.h"
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/plot_content.h"
+#include "pages/parts/river_map.h"
 #include "pages/parts/series_controls.h"
 #include "pages/parts/zone_controls.h"
 #include "platform/item_types.h"
+#include "simspec/river_branches.h"
+#include "simspec/river_files.h"
+#include "spatial/river_places.h"
 #include "surface/irrigation.h"
 #include "surface/pages.h"
 
@@ -53,10 +57,17 @@ class CIrrCommandAreasPropDlg : public PageOf<CIrrCommandAreasPropKvf> {
   void DescribeShallowWell(PageForm& form);
   void DescribeLicense(PageForm& form);
   void PickWell();
+  void PickReach();
+  /// Changes the source that was current when the map was asked, if it is still there.
+  void Change(const Source* asked, const std::string& action, const std::function<void(Source&)>& change);
+  /// The river network, and above it the reach of the current source.
+  void AddReach(MapContent& map);
   void CreateLicense();
-  MapContent Map() const;
+  MapContent Map();
 
   std::shared_ptr<SourceTable> table_;
+  std::shared_ptr<const std::vector<MapLine>>
+      reach_;  ///< Of the current source, kept so that maps tell it as the same.
   MapQuestion question_;
 };
 
@@ -84,9 +95,14 @@ Condition CIrrCommandAreasPropDlg::IsCurrent(Source::Kind kind, const char* sent
 
 void CIrrCommandAreasPropDlg::DescribeRiver(PageForm& form) {
   RowFields<Source> fields(form, table_);
-  fields.Value("River Name:", &Source::RiverNameRS);
+  fields.Value("River Name:", &Source::RiverNameRS).Offers([this](Source&) {
+    return RiverBranches::Of(Node()).Names();
+  });
   fields.Value("Upsteam Chainage:", &Source::UpstreamChainageRS);
   fields.Value("Downstream  Chainage:", &Source::DownstreamChainageRS);
+  form.Button("Pick Reach on Map", [this] { PickReach(); })
+      .ToolTip("Takes branch and chainages from a line that is drawn along the river on the map")
+      .EnabledWhen("the setup has a river network", [this] { return RiverBranches::Of(Node()).AreKnown(); });
   fields.Value("Max rate:", &Source::CapacityRS);
   const auto withoutDischarge = [](const Source& source) { return source.UseThresholdDischargeRateRS == 0; };
   fields.Check("Use threshold river discharge", &Source::UseThresholdDischargeRateRS)
@@ -146,15 +162,60 @@ void CIrrCommandAreasPropDlg::PickWell() {
   const Source* asked = table_->Current();
   if (!asked) return;
   question_.AskPoint("Click the place of the well. Esc gives up.", [this, asked](MapPoint place) {
-    // The source may have gone meanwhile, or another one may be the current one.
-    for (int row = 1; row <= table_->RowCount(); ++row) {
-      Source& source = table_->At(row);
-      if (&source != asked) continue;
+    Change(asked, "Pick Place of the Well", [place](Source& source) {
       source.WellXposSIWS = static_cast<float>(place.x);
       source.WellYposSIWS = static_cast<float>(place.y);
-      UpdateDoc(kDataChanged, "Pick Place of the Well");
-    }
+    });
   });
+}
+
+void CIrrCommandAreasPropDlg::PickReach() {
+  const Source* asked = table_->Current();
+  if (!asked) return;
+  question_.AskLine("Click the upstream end of the reach, then double click the other one. Esc gives up.",
+                    [this, asked](const std::vector<MapPoint>& points) {
+                      const RiverBranches branches = RiverBranches::Of(Node());
+                      const CYbSimpleRiverData& network = branches.Reading().network;
+                      const RiverPlace upstream = NearestPlace(network, points.front());
+                      if (!upstream.branch) return;
+                      const RiverPlace downstream = NearestPlace(network, points.back(), upstream.branch->name);
+                      Change(asked, "Pick Reach of the Source", [&](Source& source) {
+                        source.RiverNameRS = upstream.branch->name;
+                        source.UpstreamChainageRS = static_cast<float>(upstream.chainage);
+                        source.DownstreamChainageRS = static_cast<float>(downstream.chainage);
+                      });
+                    });
+}
+
+void CIrrCommandAreasPropDlg::Change(const Source* asked, const std::string& action,
+                                     const std::function<void(Source&)>& change) {
+  for (int row = 1; row <= table_->RowCount(); ++row) {
+    Source& source = table_->At(row);
+    if (&source != asked) continue;
+    change(source);
+    UpdateDoc(kDataChanged, action);
+  }
+}
+
+void CIrrCommandAreasPropDlg::AddReach(MapContent& map) {
+  const Source* source = table_->Current();
+  if (!source || source->SourceTypeCode != Source::kRiver) return;
+  AddRiver(map, RiverFileOfSetup(Node()));
+  const RiverBranches branches = RiverBranches::Of(Node());
+  const RiverBranch* branch = branches.Reading().Find(source->RiverNameRS);
+  if (!branch) return;
+  constexpr unsigned kReachOrange = 0xd9730d;
+  std::vector<MapPoint> course = CourseBetween(*branch, static_cast<double>(source->UpstreamChainageRS),
+                                               static_cast<double>(source->DownstreamChainageRS));
+  if (!reach_ || reach_->front().points != course)
+    reach_ = std::make_shared<const std::vector<MapLine>>(
+        1, MapLine{.name = source->RiverNameRS, .points = std::move(course)});
+  LineLayer reach;
+  reach.lines = reach_;
+  reach.withNames = false;
+  reach.lineColor = kReachOrange;
+  reach.lineWidth = 4;
+  if (reach.lines->front().points.size() > 1) map.lines.push_back(std::move(reach));
 }
 
 void CIrrCommandAreasPropDlg::CreateLicense() {
@@ -168,7 +229,7 @@ void CIrrCommandAreasPropDlg::CreateLicense() {
   }
 }
 
-MapContent CIrrCommandAreasPropDlg::Map() const {
+MapContent CIrrCommandAreasPropDlg::Map() {
   MapContent map = ZoneMap(*ZonesOf(Node()), &Node());
   PointLayer wells;
   for (int row = 1; row <= table_->RowCount(); ++row) {
@@ -179,6 +240,7 @@ MapContent CIrrCommandAreasPropDlg::Map() const {
     wells.labels.push_back(fmt::format("Source {}", row));
   }
   if (!wells.points.empty() && !map.IsEmpty()) map.points.insert(map.points.begin(), std::move(wells));
+  if (!map.IsEmpty()) AddReach(map);
   question_.PutOn(map);
   return map;
 }

@@ -7,7 +7,9 @@
 #include "data/series_file.h"
 #include "forms/plots.h"
 #include "platform/item_types.h"
+#include "simspec/model_components.h"
 #include "surface/irrigation.h"
+#include "surface/rivers.h"
 #include "tests/support/data_files.h"
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
@@ -126,6 +128,47 @@ TEST_F(IrrigationPages, AWellIsPlacedByAClickOnTheMap) {
   EXPECT_FALSE(shown.request);
   ASSERT_EQ(shown.points.size(), 1U);
   EXPECT_EQ(shown.points[0].labels[0], "Source 2");
+}
+
+TEST_F(IrrigationPages, AReachIsDrawnAndTakenFromTheMap) {
+  folder.Write("net.fvnwk",
+               "target FLUVANE_Network_editor {\n  section POINTS {\n    Point = 1, 0, 0, 100\n    Point = 2, 200, 0, "
+               "300\n  }\n  section BRANCHES {\n    section Branch_1 {\n      Name = \"Rhone\"\n      Points = 1, 2\n"
+               "    }\n  }\n}\n");
+  const std::string run =
+      folder.Write("run.fvsim", "target FvRun {\n  section input {\n    nwk = file \"net.fvnwk\"\n  }\n}\n");
+  test::PageDriver page(document, "LandUse/CommandAreas/CommandArea");
+  EXPECT_FALSE(page.IsEnabled("Pick Reach on Map"));
+  document.Root().Important(kModelComponents)->River = 1;
+  dynamic_cast<CRiverKvf&>(*FindNode(document.Root(), ParseSetupPath("River").steps)).SetRiverFile(FileName(run, ""));
+  EXPECT_TRUE(page.IsEnabled("Pick Reach on Map"));
+  EXPECT_THAT(page.Find("River Name:").offers(), testing::ElementsAre("Rhone"));
+
+  // What the network lacks is told, and is no error.
+  auto& source = dynamic_cast<Source&>(
+      *FindNode(document.Root(), ParseSetupPath("LandUse/CommandAreas/CommandArea/Sources/Source1").steps));
+  const auto finding = [&] {
+    EXPECT_TRUE(source.Validate());
+    return source.Findings().empty() ? std::string() : source.Findings().back().text + source.Findings().back().key;
+  };
+  EXPECT_EQ(finding(), "The river source leads to no branchRiverNameRS");
+  source.RiverNameRS = "Rhone";
+  source.UpstreamChainageRS = 120;
+  source.DownstreamChainageRS = 900;
+  EXPECT_EQ(finding(), "The river source leaves its branchDownstreamChainageRS");
+
+  const Control& map = First(page, ControlKind::Map);
+  page.Find("Pick Reach on Map").press();
+  MapContent shown = Finished(map.map);
+  ASSERT_TRUE(shown.request);
+  shown.request->taken({{20, 10}, {70, 40}, {150, -5}});
+  EXPECT_EQ(source.UpstreamChainageRS, 120);
+  EXPECT_EQ(source.DownstreamChainageRS, 250);
+  EXPECT_EQ(finding(), "");
+  shown = Finished(map.map);
+  ASSERT_EQ(shown.lines.size(), 2U);  // the network, and the reach above it
+  EXPECT_EQ(shown.lines[1].lines->front().points, (std::vector<MapPoint>{{20, 0}, {150, 0}}));
+  EXPECT_EQ(Finished(map.map).lines[1].lines, shown.lines[1].lines);  // so that a view knows that it is the same
 }
 
 TEST_F(IrrigationPages, ALicenseIsChosenForTheCurrentSourceAlone) {
