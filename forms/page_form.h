@@ -150,6 +150,8 @@ class Control {
   Control& Key(std::string name) { return key = std::move(name), *this; }
   Control& Of(const CYbSEKvfBase& owner, std::string name) { return node = &owner, Key(std::move(name)); }
   Control& Folder(std::string path) { return folder = std::move(path), *this; }
+  /// Of a map, chart or section: stands above it.
+  Control& Caption(std::string text_) { return label = std::move(text_), *this; }
   Control& ToolTip(std::string text_) { return toolTip = std::move(text_), *this; }
   Control& Revalidates() { return revalidates = true, *this; }
   Control& RevalidatesLater() { return revalidatesLater = true, *this; }

@@ -51,7 +51,7 @@ bool LooksSame(const SeriesContent& a, const SeriesContent& b) {
   const auto sameMarker = [](const DateMarker& x, const DateMarker& y) {
     return x.name == y.name && x.time == y.time && !x.moved == !y.moved;
   };
-  return a.period == b.period && a.message == b.message && a.numbers == b.numbers &&
+  return a.period == b.period && a.message == b.message && a.numbers == b.numbers && a.bars == b.bars &&
          std::ranges::equal(a.markers, b.markers, sameMarker) &&
          std::ranges::equal(a.series, b.series, [](const Series& x, const Series& y) { return LooksSame(x, y); });
 }
@@ -121,6 +121,10 @@ std::string Summary(const SeriesContent& content) {
   if (content.numbers)
     text += fmt::format(", over {} [{}]{}", content.numbers->title, content.numbers->unit,
                         content.numbers->isLogarithmic ? ", logarithmic" : "");
+  const auto count = [&](TimeBar::Kind kind) { return std::ranges::count(content.bars, kind, &TimeBar::kind); };
+  if (!content.bars.empty())
+    text += fmt::format(", {} bars, {} gaps, {} overlaps", count(TimeBar::Kind::Thing), count(TimeBar::Kind::Gap),
+                        count(TimeBar::Kind::Overlap));
   for (const DateMarker& marker : content.markers)
     text += fmt::format(", {} at {}", marker.name, marker.time.Format("%Y-%m-%d %H:%M"));
   if (content.request) text += fmt::format(", asks \"{}\"", content.request->prompt);

@@ -176,6 +176,21 @@ struct Series {
   int panel = 0;                       ///< Which of several charts below each other, from 0.
 };
 
+/// A stretch of time in a strip above the curves: what was going on meanwhile.
+struct TimeBar {
+  enum class Kind {
+    Thing,    ///< Of its name; bars of one name have one colour.
+    Gap,      ///< Nothing where something was expected.
+    Overlap,  ///< Two things at once; lies over the bars of both.
+  };
+
+  std::string name;
+  CYbDateTime start, end;
+  Kind kind = Kind::Thing;
+
+  bool operator==(const TimeBar&) const = default;
+};
+
 /// A date that is marked in a chart.
 struct DateMarker {
   std::string name;
@@ -208,6 +223,7 @@ struct SeriesContent {
   std::optional<NumberAxis> numbers = {};  ///< The chart is over these, not over time.
   std::vector<DateMarker> markers = {};
   std::optional<DateRequest> request = {};
+  std::vector<TimeBar> bars = {};  ///< Ascending by their start.
 
   bool IsEmpty() const { return series.empty(); }
 };

@@ -106,6 +106,7 @@ std::string TableForm::Cell(int row, const TableColumn& column) const {
 }
 
 std::string TableForm::ShownCell(int row, const TableColumn& column) const {
+  if (column.shown) return column.shown(row);
   if (Kind(row, column) != CellKind::Choice) return CellText(column.get(row), UnitOf(column), column.format);
   std::string stored = Cell(row, column);
   const CellChoices choices = Choices(row, column);

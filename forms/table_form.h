@@ -62,6 +62,8 @@ struct TableColumn {
   std::function<CellValue(int row)> get;
   /// Takes a value of the type that `get` gives; gives why it is refused. Absent where nothing can be changed.
   std::function<std::string(int row, const CellValue& value)> set;
+  /// What a person sees of the value, where that is not what is typed.
+  std::function<std::string(int row)> shown;
   std::function<bool(int row)> readOnly;  ///< Of a button: it cannot be pressed.
   std::function<bool()> shownWhen;        ///< Absent columns have no number; asked by `TableForm::Follow`.
   std::function<std::string(int row)> cellToolTip;

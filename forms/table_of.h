@@ -71,6 +71,8 @@ class ColumnOf {
     if (control_) control_->Offers(control_->options);
     return column_.offers = ByRow<std::vector<std::string>>(std::move(texts)), *this;
   }
+  /// What a person sees of the values, where that is not what is typed.
+  ColumnOf& ShownAs(auto text) { return column_.shown = ByRow<std::string>(std::move(text)), *this; }
   /// Cells that take nothing stand back on a grey ground.
   ColumnOf& GreyWhen(auto rule) { return column_.readOnly = ByRow<bool>(std::move(rule)), *this; }
   /// Of a button.

@@ -2,9 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/charts/chart_panels.h"
 
+#include <QApplication>
+#include <algorithm>
+
 #include <qcustomplot.h>
 
 #include "shell/charts/chart_axis.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane {
 
@@ -15,8 +19,10 @@ ChartPanels::ChartPanels(QCustomPlot& chart, int firstRow)
   connect(chart.xAxis, qOverload<const QCPRange&>(&QCPAxis::rangeChanged), this, &ChartPanels::Follow);
 }
 
-void ChartPanels::SetUp(int count, const std::optional<NumberAxis>& numbers) {
-  while (static_cast<int>(rects_.size()) > std::max(count, 1)) {
+void ChartPanels::SetUp(int count, bool hasStrip, const std::optional<NumberAxis>& numbers) {
+  hasStrip_ = hasStrip;
+  count = std::max(count, 1) + (hasStrip ? 1 : 0);
+  while (static_cast<int>(rects_.size()) > count) {
     chart_.plotLayout()->remove(rects_.back());
     rects_.pop_back();
   }
@@ -33,10 +39,14 @@ void ChartPanels::SetUp(int count, const std::optional<NumberAxis>& numbers) {
             &ChartPanels::Follow);
     rects_.push_back(rect);
   }
-  for (QCPAxisRect* rect : rects_) SetUpPanel(*rect, rect == rects_.back(), numbers);
+  for (QCPAxisRect* rect : rects_) SetUpPanel(*rect, numbers);
 }
 
-void ChartPanels::SetUpPanel(QCPAxisRect& rect, bool isLast, const std::optional<NumberAxis>& numbers) {
+void ChartPanels::SetUpPanel(QCPAxisRect& rect, const std::optional<NumberAxis>& numbers) {
+  const bool isStrip = &rect == Strip(), isLast = &rect == rects_.back();
+  const int height = QFontMetrics(QApplication::font()).height() + Theme::Get().Scaled(6);
+  rect.setMinimumSize(0, isStrip ? height : 0);
+  rect.setMaximumSize(QWIDGETSIZE_MAX, isStrip ? height : QWIDGETSIZE_MAX);
   QCPAxis *keys = rect.axis(QCPAxis::atBottom), *opposite = rect.axis(QCPAxis::atTop);
   SetUpAxis(*keys, numbers);
   keys->setTickLabels(isLast);
@@ -44,7 +54,20 @@ void ChartPanels::SetUpPanel(QCPAxisRect& rect, bool isLast, const std::optional
   opposite->setVisible(true);
   opposite->setTicks(false);
   opposite->setTickLabels(false);
-  QList<QCPAxis*> moved{keys, rect.axis(QCPAxis::atLeft), rect.axis(QCPAxis::atRight)};
+  QList<QCPAxis*> moved{keys};
+  for (QCPAxis* values : {rect.axis(QCPAxis::atLeft), rect.axis(QCPAxis::atRight)}) {
+    values->setTicks(!isStrip);
+    values->setTickLabels(!isStrip);
+    values->grid()->setVisible(!isStrip && values == rect.axis(QCPAxis::atLeft));
+    if (isStrip) {
+      values->setLabel({});
+      values->setVisible(true);
+      values->setRange(0, 1);
+    } else {
+      moved.push_back(values);
+    }
+  }
+  keys->setTicks(!isStrip);
   rect.setRangeDragAxes(moved);
   rect.setRangeZoomAxes(moved);
 }
@@ -55,17 +78,16 @@ void ChartPanels::Follow(const QCPRange& range) {
 }
 
 QCPAxis& ChartPanels::Keys() const { return *rects_.front()->axis(QCPAxis::atBottom); }
-QCPAxis& ChartPanels::Keys(int panel) const {
-  return *rects_[static_cast<std::size_t>(panel)]->axis(QCPAxis::atBottom);
-}
+QCPAxis& ChartPanels::Keys(int panel) const { return *Panel(panel).axis(QCPAxis::atBottom); }
 
 QCPAxis& ChartPanels::Values(int panel, bool isSecond) const {
-  return *rects_[static_cast<std::size_t>(panel)]->axis(isSecond ? QCPAxis::atRight : QCPAxis::atLeft);
+  return *Panel(panel).axis(isSecond ? QCPAxis::atRight : QCPAxis::atLeft);
 }
 
 std::vector<QCPAxis*> ChartPanels::AllValues() const {
   std::vector<QCPAxis*> all;
   for (QCPAxisRect* rect : rects_) {
+    if (rect == Strip()) continue;
     all.push_back(rect->axis(QCPAxis::atLeft));
     all.push_back(rect->axis(QCPAxis::atRight));
   }

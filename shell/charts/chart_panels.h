@@ -24,24 +24,30 @@ class ChartPanels : public QObject {
   /// `firstRow` is the row of the chart's layout in which its own axes stand.
   ChartPanels(QCustomPlot& chart, int firstRow);
 
-  /// Makes so many charts; those beyond go. The chart must hold nothing meanwhile.
-  void SetUp(int count, const std::optional<NumberAxis>& numbers);
+  /// Makes so many charts, below a strip where one is wanted; those beyond go. The chart must hold nothing meanwhile.
+  void SetUp(int count, bool hasStrip, const std::optional<NumberAxis>& numbers);
+  /// All from top to bottom, a strip too.
   const std::vector<QCPAxisRect*>& Rects() const { return rects_; }
+  /// The strip above the charts, a line of text high; null without one.
+  QCPAxisRect* Strip() const { return hasStrip_ ? rects_.front() : nullptr; }
   /// The horizontal axis of the first chart, which all others follow.
   QCPAxis& Keys() const;
   QCPAxis& Keys(int panel) const;
   /// On the left, or for the second unit on the right.
   QCPAxis& Values(int panel, bool isSecond) const;
+  /// Without that of a strip.
   std::vector<QCPAxis*> AllValues() const;
-  void SetUpPanel(QCPAxisRect& rect, bool isLast, const std::optional<NumberAxis>& numbers);
 
  private:
+  void SetUpPanel(QCPAxisRect& rect, const std::optional<NumberAxis>& numbers);
+  QCPAxisRect& Panel(int panel) const { return *rects_[static_cast<std::size_t>(panel + (hasStrip_ ? 1 : 0))]; }
   void Follow(const QCPRange& range);
 
   QCustomPlot& chart_;
   int firstRow_;
   QCPMarginGroup* margins_;
   std::vector<QCPAxisRect*> rects_;
+  bool hasStrip_ = false;
 };
 
 }  // namespace tervane

@@ -17,6 +17,7 @@
 #include "shell/charts/chart_markers.h"
 #include "shell/charts/chart_panels.h"
 #include "shell/charts/chart_style.h"
+#include "shell/charts/time_bars.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -125,14 +126,19 @@ void SeriesPlot::Build() {
   curves_.clear();
   periods_.clear();
   pointers_.clear();
+  bars_ = nullptr;
   int panels = 1;
   for (const Series& series : content_.series) panels = std::max(panels, series.panel + 1);
-  panels_->SetUp(panels, content_.numbers);
+  const bool hasBars = !content_.IsEmpty() && !content_.numbers && !content_.bars.empty();
+  panels_->SetUp(panels, hasBars, content_.numbers);
+  if (hasBars) BuildStrip();
   for (int panel = 0; panel < panels; ++panel) BuildPanel(panel);
   message_->setText(content_.message.empty() ? tr("There is nothing to show.") : Translated(content_.message));
   message_->setVisible(content_.IsEmpty());
-  markers_->Show(content_.IsEmpty() || content_.numbers ? std::vector<DateMarker>() : content_.markers,
-                 panels_->Rects());
+  // The first one bears the names, which have no room in a strip.
+  std::vector<QCPAxisRect*> marked = panels_->Rects();
+  if (hasBars) std::ranges::rotate(marked, marked.begin() + 1);
+  markers_->Show(content_.IsEmpty() || content_.numbers ? std::vector<DateMarker>() : content_.markers, marked);
   SetStatus({});
   ApplyTheme();
   Fit();
@@ -152,17 +158,26 @@ void SeriesPlot::BuildPanel(int panel) {
   right.setVisible(true);
   right.setTickLabels(hasSecond);
   right.setTicks(hasSecond);
-  if (content_.IsEmpty()) return;
+  if (!content_.IsEmpty()) AddPeriodAndPointer(keys, left);
+}
+
+void SeriesPlot::BuildStrip() {
+  QCPAxis &keys = *panels_->Strip()->axis(QCPAxis::atBottom), &values = *panels_->Strip()->axis(QCPAxis::atLeft);
+  bars_ = new TimeBarPlottable(&keys, &values, content_.bars);
+  AddPeriodAndPointer(keys, values);
+}
+
+void SeriesPlot::AddPeriodAndPointer(QCPAxis& keys, QCPAxis& values) {
   const auto over = [&](QCPItemPosition* place) {
-    place->setAxes(&keys, &left);
-    place->setAxisRect(left.axisRect());
+    place->setAxes(&keys, &values);
+    place->setAxisRect(values.axisRect());
     place->setTypeX(QCPItemPosition::ptPlotCoords);
     place->setTypeY(QCPItemPosition::ptAxisRectRatio);
   };
   if (content_.period && !content_.numbers && content_.period->first.IsValid() && content_.period->second.IsValid()) {
     auto* period = new QCPItemRect(chart_);
     period->setLayer("background");
-    period->setClipAxisRect(left.axisRect());
+    period->setClipAxisRect(values.axisRect());
     over(period->topLeft);
     over(period->bottomRight);
     period->topLeft->setCoords(AxisCoordinate(content_.period->first), 0);
@@ -172,7 +187,7 @@ void SeriesPlot::BuildPanel(int panel) {
   auto* pointer = new QCPItemStraightLine(chart_);
   pointer->setLayer(kPointerLayer);
   pointer->setVisible(false);
-  pointer->setClipAxisRect(left.axisRect());
+  pointer->setClipAxisRect(values.axisRect());
   over(pointer->point1);
   over(pointer->point2);
   pointers_.push_back(pointer);
@@ -259,6 +274,9 @@ void SeriesPlot::Fit() {
     const QCPRange own = curve.graph->getKeyRange(isFound, isLogarithmic ? QCP::sdPositive : QCP::sdBoth);
     if (isFound) keys = keys ? keys->expanded(own) : own;
   }
+  bool hasBars = false;
+  const QCPRange barred = bars_ ? bars_->getKeyRange(hasBars, QCP::sdBoth) : QCPRange();
+  if (hasBars) keys = keys ? keys->expanded(barred) : barred;
   for (QCPAxis* axis : panels_->AllValues()) {
     axis->rescale();
     // Curves keep off the frame, but what starts at zero stands on it. Names stand above the curves.
@@ -354,6 +372,7 @@ QString SeriesPlot::TextAt(double time) const {
     text += "   " + ToQt(curve.series->name) + " " + (std::isnan(at->value) ? tr("no value") : ValueText(at->value));
     if (!std::isnan(at->value) && !curve.series->unit.empty()) text += " " + ToQt(curve.series->unit);
   }
+  if (const QString names = bars_ ? bars_->NamesAt(time) : QString(); !names.isEmpty()) text += "   " + names;
   return text;
 }
 

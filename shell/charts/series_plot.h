@@ -22,6 +22,7 @@ namespace tervane {
 
 class ChartMarkers;
 class ChartPanels;
+class TimeBarPlottable;
 
 /// A chart of a page: curves over time or a number with their legend, also several charts below each other.
 ///
@@ -56,6 +57,10 @@ class SeriesPlot : public PlotFrame {
   void Build();
   /// One of the charts below each other.
   void BuildPanel(int panel);
+  /// The strip above the charts, with the bars.
+  void BuildStrip();
+  /// The simulated time and the line at the pointer.
+  void AddPeriodAndPointer(QCPAxis& keys, QCPAxis& values);
   void AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values);
   void ApplyTheme();
   /// As many columns of names and ticks as there is room for.
@@ -71,6 +76,7 @@ class SeriesPlot : public PlotFrame {
   std::vector<Curve> curves_;
   ChartPanels* panels_ = nullptr;
   ChartMarkers* markers_ = nullptr;
+  TimeBarPlottable* bars_ = nullptr;   ///< Null without bars.
   std::vector<QCPItemRect*> periods_;  ///< Of each chart.
   std::vector<QCPItemStraightLine*> pointers_;
 };

@@ -39,6 +39,7 @@ class TableWidget : public ControlWidget {
 class MapWidget : public ControlWidget {
  public:
   MapWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    MakeLabel();
     view_ = new MapView(page.Outside());
     MakeField(view_, true);
   }
@@ -61,6 +62,7 @@ class MapWidget : public ControlWidget {
 class ChartWidget : public ControlWidget {
  public:
   ChartWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    MakeLabel();
     plot_ = new SeriesPlot(page.Outside());
     MakeField(plot_, true);
   }
@@ -83,6 +85,7 @@ class ChartWidget : public ControlWidget {
 class SectionWidget : public ControlWidget {
  public:
   SectionWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    MakeLabel();
     view_ = new SectionView(page.Outside());
     MakeField(view_, true);
   }

@@ -248,8 +248,10 @@ void PageView::AddPlot(Control& control) {
     column->setContentsMargins(margin, 0, margin, margin);
   }
   ControlWidget& made = *widgets_.emplace_back(ControlWidget::Make(page_, control));
+  auto& column = static_cast<QVBoxLayout&>(*plotPlace_->layout());
+  if (QWidget* caption = made.Label()) column.addWidget(caption);
   // A chart and a map below each other share the height.
-  static_cast<QVBoxLayout*>(plotPlace_->layout())->addWidget(made.Field(), 1);
+  column.addWidget(made.Field(), 1);
   plots_.push_back(&control);
 }
 

@@ -1,0 +1,45 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <QString>
+#include <vector>
+
+#include <qcustomplot.h>
+
+#include "forms/plots.h"
+
+namespace tervane {
+
+/// Stretches of time as bars that fill the height of their chart, with their names where there is room. Gaps and
+/// overlaps are hatched.
+class TimeBarPlottable : public QCPAbstractPlottable {
+ public:
+  TimeBarPlottable(QCPAxis* keys, QCPAxis* values, const std::vector<TimeBar>& bars);
+
+  /// What was going on at a time: the names of all bars there.
+  QString NamesAt(double time) const;
+
+  double selectTest(const QPointF& /*at*/, bool /*onlySelectable*/, QVariant* /*details*/) const override { return -1; }
+  QCPRange getKeyRange(bool& isFound, QCP::SignDomain domain) const override;
+  QCPRange getValueRange(bool& isFound, QCP::SignDomain domain, const QCPRange& keys) const override;
+
+ protected:
+  void draw(QCPPainter* painter) override;
+  void drawLegendIcon(QCPPainter* /*painter*/, const QRectF& /*place*/) const override {}
+
+ private:
+  struct Bar {
+    double start, end;
+    QString name;
+    std::size_t color;  ///< Of its name.
+    TimeBar::Kind kind;
+  };
+
+  void DrawBar(QCPPainter& painter, const Bar& bar, const QRectF& place) const;
+
+  std::vector<Bar> bars_;  ///< Ascending by their start.
+  double longest_ = 0;     ///< Of all bars.
+};
+
+}  // namespace tervane
