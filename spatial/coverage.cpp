@@ -373,6 +373,13 @@ std::vector<PeriodSum> SumsOfConstant(double value, const std::vector<TimeSpan>&
   return sums;
 }
 
+/// What lines come to.
+std::vector<PeriodSum> SumsOfLines(const std::vector<ForcingLine>& lines, const std::vector<TimeSpan>& periods) {
+  PeriodSums sums(periods);
+  for (const ForcingLine& line : lines) sums.Add({line.start, line.end}, line.first, line.last);
+  return sums.Sums();
+}
+
 ForcingTotals CoverageBuilder::MakeForcing(const CoverageForcing& asked) {
   LeaveIfCancelled();
   ForcingTotals totals;
@@ -397,6 +404,10 @@ ForcingTotals CoverageBuilder::MakeForcing(const CoverageForcing& asked) {
     column.name = series.name.empty() ? "all" : series.name;
     if (series.constant) {
       column.sums = SumsOfConstant(*series.constant, Spans());
+    } else if (series.lines) {
+      column.sums = SumsOfLines(*series.lines, Spans());
+    } else if (!series.problem.empty()) {
+      column.problem = series.problem;
     } else {
       takeKind(series.path, series.item);
       const SeriesFacts& facts = FactsOfSeries(series.path, series.item);

@@ -60,8 +60,9 @@ void AddRequestsBelow(const CYbSEKvfBase& node, WalkedNode& place, CoverageReque
     if (const auto* user = dynamic_cast<const FileUser*>(child))
       if (std::optional<FileUse> use = user->UsedFile())
         request.files.push_back(AskFile(*child, childPlace.Path(), *std::move(use)));
-    if (const auto* forcing = dynamic_cast<const ForcingNode*>(child))
-      request.forcings.push_back({childPlace.Path(), child->Serial(), forcing->CurrentForcing()});
+    if (const auto* driver = dynamic_cast<const ForcingNode*>(child))
+      for (Forcing& forcing : driver->CurrentForcings())
+        request.forcings.push_back({childPlace.Path(), child->Serial(), std::move(forcing)});
     AddRequestsBelow(*child, childPlace, request);
   }
 }

@@ -5,6 +5,7 @@
 // the classes of nodes. All are copies of values: another thread may work on them.
 #pragma once
 
+#include <cstdint>
 #include <memory>
 #include <optional>
 #include <string>
@@ -66,11 +67,21 @@ class CellValues {
   virtual std::shared_ptr<ComputedGrid> GridComputation() { return nullptr; }
 };
 
-/// A constant, or an item of a file over time.
+/// A value that goes in a line from one time to another, in seconds since 1970-01-01.
+struct ForcingLine {
+  std::int64_t start = 0, end = 0;
+  double first = 0, last = 0;
+
+  bool operator==(const ForcingLine&) const = default;
+};
+
+/// A constant, lines over time, or an item of a file over time.
 struct ForcingSeries {
   std::string name;  ///< Of the station; empty where there is only one.
   std::string id;    ///< The station's code in the grid of areas, or the value of its polygons.
   std::optional<double> constant;
+  std::optional<std::vector<ForcingLine>> lines = {};
+  std::string problem = {};  ///< Why nothing is known of it; empty where it is.
   std::string path;
   std::vector<FileStamp> stamps;
   int item = 1;
@@ -89,10 +100,11 @@ struct Forcing {
   bool operator==(const Forcing&) const = default;
 };
 
+/// A node that holds one such quantity or more.
 class ForcingNode {
  public:
   virtual ~ForcingNode() = default;
-  virtual Forcing CurrentForcing() const = 0;
+  virtual std::vector<Forcing> CurrentForcings() const = 0;
 };
 
 }  // namespace tervane

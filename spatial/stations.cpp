@@ -8,10 +8,7 @@
 
 namespace tervane {
 
-namespace {
-
-/// A file over time, of a forcing as a whole or of one of its stations.
-ForcingSeries SeriesOf(const DataFileNode& file) {
+ForcingSeries ForcingSeriesOf(const DataFileNode& file) {
   ForcingSeries series;
   series.path = file.File.IsEmpty() ? std::string() : file.File.Absolute();
   series.stamps = StampsOf(series.path);
@@ -19,15 +16,12 @@ ForcingSeries SeriesOf(const DataFileNode& file) {
   return series;
 }
 
-/// A value or a series.
-ForcingSeries SeriesOf(int type, float value, const DataFileNode& file) {
-  if (type == CGlobalKvf::kTimeVarying) return SeriesOf(file);
+ForcingSeries ForcingSeriesOf(bool isOverTime, float value, const DataFileNode& file) {
+  if (isOverTime) return ForcingSeriesOf(file);
   ForcingSeries series;
   series.constant = static_cast<double>(value);
   return series;
 }
-
-}  // namespace
 
 // ---- Parts
 
@@ -102,28 +96,30 @@ std::shared_ptr<CFMSEKvfGroupBase> C2DStationBasedDataKvf::CreateStationItem() {
   return std::make_shared<C2DStationBasedDataTimeSeriesKvf>(kind_, this);
 }
 
-Forcing C2DStationBasedDataKvf::CurrentForcing() const {
+std::vector<Forcing> C2DStationBasedDataKvf::CurrentForcings() const {
   Forcing forcing;
   forcing.title = GetTitle();
   forcing.itemType = GetItemType();
   if (DistributionType == kFullyDistributed) {
-    forcing.overGrid = SeriesOf(fully_->GridFile());
-    return forcing;
+    forcing.overGrid = ForcingSeriesOf(fully_->GridFile());
+    return {std::move(forcing)};
   }
   if (DistributionType != kStationBased) {
-    forcing.series.push_back(SeriesOf(global_->TYPE, global_->FIXED_VALUE, global_->SeriesFile()));
-    return forcing;
+    forcing.series.push_back(
+        ForcingSeriesOf(global_->TYPE == CGlobalKvf::kTimeVarying, global_->FIXED_VALUE, global_->SeriesFile()));
+    return {std::move(forcing)};
   }
   forcing.areas = Stations().CurrentSource();
   for (const CFMSEKvfGroupBase* item : ZoneItems(*this)) {
     const auto* station = dynamic_cast<const C2DStationBasedDataTimeSeriesKvf*>(item);
     if (!station) continue;
-    ForcingSeries series = SeriesOf(station->TYPE, station->FIXED_VALUE, station->SeriesFile());
+    ForcingSeries series =
+        ForcingSeriesOf(station->TYPE == CGlobalKvf::kTimeVarying, station->FIXED_VALUE, station->SeriesFile());
     series.name = station->NAME;
     series.id = station->GRIDCODEID;
     forcing.series.push_back(std::move(series));
   }
-  return forcing;
+  return {std::move(forcing)};
 }
 
 int C2DStationBasedDataKvf::IsDlgUsedInSetup() {
@@ -138,12 +134,13 @@ CTimeseriesConstKvf::CTimeseriesConstKvf(int itemType, CYbSEKvfBase* parent)
   SetPage(kTimeseriesConstPage);
 }
 
-Forcing CTimeseriesConstKvf::CurrentForcing() const {
+std::vector<Forcing> CTimeseriesConstKvf::CurrentForcings() const {
   Forcing forcing;
   forcing.title = GetTitle();
   forcing.itemType = itemType_;
-  forcing.series.push_back(SeriesOf(global_->TYPE, global_->FIXED_VALUE, global_->SeriesFile()));
-  return forcing;
+  forcing.series.push_back(
+      ForcingSeriesOf(global_->TYPE == CGlobalKvf::kTimeVarying, global_->FIXED_VALUE, global_->SeriesFile()));
+  return {std::move(forcing)};
 }
 
 }  // namespace tervane

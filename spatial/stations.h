@@ -35,6 +35,11 @@ struct ForcingKind {
   const PageClass* stationPage;
 };
 
+/// A file over time, of a forcing as a whole or of one of its stations.
+ForcingSeries ForcingSeriesOf(const DataFileNode& file);
+/// A value or a series: a value unless `isOverTime`.
+ForcingSeries ForcingSeriesOf(bool isOverTime, float value, const DataFileNode& file);
+
 /// Texts of a value's two forms in time; in the file one higher.
 inline constexpr KeyChoice kTemporalDistributions[] = {{0, "Constant"}, {1, "Time varying (.nds0)"}};
 
@@ -113,7 +118,7 @@ class C2DStationBasedDataKvf : public StationOwnerKvf, public ForcingNode {
   CFullyDistributedKvf& FullyDistributed() const { return *fully_; }
 
   std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
-  Forcing CurrentForcing() const override;
+  std::vector<Forcing> CurrentForcings() const override;
   /// By its rule; without one as its parent does.
   int IsDlgUsedInSetup() override;
 
@@ -133,7 +138,7 @@ class CTimeseriesConstKvf : public CTvnKvfBase, public ForcingNode {
 
   int GetItemType() const { return itemType_; }
   CGlobalKvf& Global() const { return *global_; }
-  Forcing CurrentForcing() const override;
+  std::vector<Forcing> CurrentForcings() const override;
 
  private:
   int itemType_;

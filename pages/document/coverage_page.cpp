@@ -133,12 +133,12 @@ std::string CCoverageDlg::RemarksText() const {
   if (!board_) return {};
   for (const CoverageRow& row : board_->rows)
     if (row.file.path == chosen_)
-
       return fmt::format("{}{}{}:\n{}", row.file.title, row.file.use.path.empty() ? "" : ", ",
                          FileNameOf(row.file.use.path), TextOf(row));
+  std::string text;
   for (const ForcingTotals& totals : board_->forcings)
-    if (totals.forcing.path == chosen_) return TextOf(totals);
-  return "no data file is in use";
+    if (totals.forcing.path == chosen_) text += (text.empty() ? "" : "\n") + TextOf(totals);
+  return text.empty() ? "no data file is in use" : text;
 }
 
 MapContent CCoverageDlg::Map() {
@@ -174,11 +174,14 @@ SeriesContent CCoverageDlg::Chart() {
     chart.message = row.file.use.isOverTime ? row.problem : "It has no values over time.";
     return chart;
   }
+  const auto isChosen = [this](const ForcingTotals& totals) { return totals.forcing.path == chosen_; };
+  const bool areSeveral = std::ranges::count_if(board_->forcings, isChosen) > 1;
   for (const ForcingTotals& totals : board_->forcings) {
-    if (totals.forcing.path != chosen_) continue;
+    if (!isChosen(totals)) continue;
     for (std::size_t column = 0; column < totals.columns.size(); ++column) {
       Series series;
       series.name = totals.columns[column].name;
+      if (areSeveral) series.name = fmt::format("{}, {}", totals.forcing.forcing.title, series.name);
       series.unit = totals.form.unit;
       series.isStepped = true;
       // A point in front of the first year, from which its step goes; the last period is the simulation as a whole.
