@@ -9,6 +9,7 @@
 #include <fmt/format.h>
 
 #include "data/datafile.h"
+#include "data/datafile_request.h"
 #include "data/grid_files.h"
 #include "geometry/grid_polygons.h"
 #include "geometry/shapes.h"
@@ -24,6 +25,7 @@
 #include "spatial/domain_boundary.h"
 #include "spatial/stations.h"
 #include "spatial/zones.h"
+#include "surface/vegetation.h"
 
 namespace tervane {
 
@@ -44,6 +46,21 @@ std::string WithUnit(double value, int itemType) {
   const std::string number = FormatQuantity(value, *type, BaseUnit(*type).key);
   const std::string_view unit = BaseUnit(*type).abbreviation;
   return unit.empty() || unit == "-" ? number : fmt::format("{} {}", number, unit);
+}
+
+/// When which crop grows, a line each.
+std::string CropsText(const CropDevelopment& development) {
+  constexpr std::size_t kMostLines = 1000;
+  std::string text = development.problem;
+  for (std::size_t i = 0; i < development.stretches.size(); ++i) {
+    const CropStretch& stretch = development.stretches[i];
+    if (i == kMostLines) return text + fmt::format("and {} lines more", development.stretches.size() - i);
+    if (stretch.kind == CropStretch::Kind::Overlap) continue;
+    text += fmt::format("{} to {}: {}\n", DateInWords(CYbDateTime::FromSecondsSinceEpoch(stretch.span.start)),
+                        DateInWords(CYbDateTime::FromSecondsSinceEpoch(stretch.span.end)),
+                        stretch.file ? stretch.file->VegetationName() : "no crop");
+  }
+  return text;
 }
 
 /// The mean of the steps of a file of grids that share some time with a period, or of all steps where the file has no
@@ -168,6 +185,11 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
     const auto* owner = dynamic_cast<const C2DStationBasedDataKvf*>(station->GetParent());
     ShowSeries(station->TYPE == C2DStationBasedDataTimeSeriesKvf::kConstant, station->FIXED_VALUE,
                owner ? owner->GetItemType() : quantity::kUndefined, station->SeriesFile(), page);
+  } else if (auto* vegetation = dynamic_cast<CVegetationKvf*>(&node)) {
+    ShowVegetation(*vegetation, page);
+  } else if (const auto* growth = dynamic_cast<const CVegetationTimeSeriesKvf*>(&node)) {
+    page.title = growth->GetStationName();
+    ShowCourse(*growth, page);
   } else if (const auto* series = dynamic_cast<const CTimeseriesConstKvf*>(&node)) {
     const CGlobalKvf& global = series->Global();
     ShowSeries(global.TYPE == CGlobalKvf::kConstant, global.FIXED_VALUE, series->GetItemType(), global.SeriesFile(),
@@ -256,18 +278,54 @@ void Preprocessor::ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page
   switch (forcing.DistributionType) {
     case C2DStationBasedDataKvf::kStationBased:
       return ShowZoneMap(forcing, forcing.Stations().CurrentSource(), page);
-    case C2DStationBasedDataKvf::kFullyDistributed: {
-      const CFMData2DNdsFile& file = forcing.FullyDistributed().GridFile();
-      auto make = [path = file.File.Absolute(), item = file.SelectedItem(), start = period_->GetSimStartDate(),
-                   end = period_->SIMEND](CTvn2DOrthoRotatedGridData& grid) {
-        return MeanOfSteps(path, item, start, end, grid);
-      };
-      page.title += ", mean of the time steps";
-      return ShowGrid({page.title, PathOf(file), forcing.GetItemType(), std::move(make), {}, {}, {}}, page);
-    }
+    case C2DStationBasedDataKvf::kFullyDistributed:
+      return ShowMeanGrid(forcing.FullyDistributed().GridFile(), forcing.GetItemType(), page);
     default:
       return ShowSeries(global.TYPE == CGlobalKvf::kConstant, global.FIXED_VALUE, forcing.GetItemType(),
                         global.SeriesFile(), page);
+  }
+}
+
+void Preprocessor::ShowMeanGrid(const DataFileNode& file, int itemType, ReportPage& page) {
+  auto make = [path = file.File.Absolute(), item = file.SelectedItem(), start = period_->GetSimStartDate(),
+               end = period_->SIMEND](CTvn2DOrthoRotatedGridData& grid) {
+    return MeanOfSteps(path, item, start, end, grid);
+  };
+  page.title += ", mean of the time steps";
+  ShowGrid({page.title, PathOf(file), itemType, std::move(make), {}, {}, {}}, page);
+}
+
+void Preprocessor::ShowVegetation(CVegetationKvf& vegetation, ReportPage& page) {
+  switch (vegetation.DistributionType) {
+    case CVegetationKvf::kStationBased:
+      return ShowZoneMap(vegetation, vegetation.Stations().CurrentSource(), page);
+    case CVegetationKvf::kFullyDistributed: {
+      const CVegetationFullyDistKvf& grids = vegetation.FullyDistributed();
+      page.pages.resize(2);
+      page.pages[0].title = "Leaf area index";
+      ShowMeanGrid(grids.LaiFile(), quantity::kLeafAreaIndex, page.pages[0]);
+      page.pages[1].title = "Root depth";
+      return ShowMeanGrid(grids.RootDepthFile(), quantity::kRootDepth, page.pages[1]);
+    }
+    default:
+      return ShowCourse(vegetation.Global(), page);
+  }
+}
+
+void Preprocessor::ShowCourse(const VegetationCourse& course, ReportPage& page) {
+  switch (course.TYPE) {
+    case VegetationCourse::kTimeVarying:
+      page.pages.resize(2);
+      page.pages[0].title = "Leaf area index";
+      ShowSeries(false, 0, quantity::kLeafAreaIndex, course.LaiFile(), page.pages[0]);
+      page.pages[1].title = "Root depth";
+      return ShowSeries(false, 0, quantity::kRootDepth, course.RootDepthFile(), page.pages[1]);
+    case VegetationCourse::kCrops:
+      return page.ShowText(CropsText(course.Crops().Development()));
+    default:
+      return page.ShowText(fmt::format("Leaf area index {}, root depth {}, constant",
+                                       WithUnit(static_cast<double>(course.FIXED_VALUE_LAI), quantity::kLeafAreaIndex),
+                                       WithUnit(static_cast<double>(course.FIXED_VALUE_RD), quantity::kRootDepth)));
   }
 }
 

@@ -20,7 +20,10 @@ class CData2DKvf;
 class CSimPeriodKvf;
 class CFMData0DFile;
 class CFMSEKvfBase;
+class CVegetationKvf;
 class CodedZonesKvf;
+class DataFileNode;
+class VegetationCourse;
 struct GridSource;
 
 /// Puts everything that varies over the model area on the cells of the model, and reports what it made as a tree of
@@ -49,11 +52,16 @@ class Preprocessor {
   void ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page);
   /// The network as lines, which the river model moves the water along.
   void ShowRiver(const CYbSEKvfBase& node, ReportPage& page);
+  void ShowVegetation(CVegetationKvf& vegetation, ReportPage& page);
+  /// The constants, both series on pages of their own, or which crop grows when.
+  void ShowCourse(const VegetationCourse& course, ReportPage& page);
   /// A constant as text, or a series.
   void ShowSeries(bool isConstant, float value, int itemType, const CFMData0DFile& file, ReportPage& page);
   /// A map of the codes of zones or stations.
   void ShowZoneMap(CFMSEKvfBase& owner, const GridSource& source, ReportPage& page);
   void ShowGrid(ModelGrid grid, ReportPage& page);
+  /// The mean of the grids of a file over the simulation.
+  void ShowMeanGrid(const DataFileNode& file, int itemType, ReportPage& page);
   std::string SummaryText() const;
 
   CFlowModelDoc& document_;

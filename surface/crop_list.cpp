@@ -3,6 +3,7 @@
 #include "surface/crop_list.h"
 
 #include <chrono>
+#include <map>
 
 #include <fmt/format.h>
 
@@ -82,6 +83,31 @@ CropCalendar CVegetationListKvf::BuildVegCalendar() const {
     crops.push_back({&item.VegPropFile(), item.StartDate, item.Length(), item.Valid() != 0});
   }
   return tervane::BuildVegCalendar(crops, RecycleMode, period->SIMEND);
+}
+
+CropDevelopment CVegetationListKvf::Development() const {
+  // Many more than there are pixels and days in any simulation.
+  constexpr std::size_t kMostCrops = 20'000;
+  CropDevelopment development;
+  const auto* period = Important(kSimulationPeriod);
+  const CYbDateTime start = period ? period->GetSimStartDate() : CYbDateTime();
+  if (!start.IsValid() || period->SIMEND <= start) {
+    development.problem = "the dates of the simulation are none, or in no order";
+    return development;
+  }
+  const CropCalendar calendar = BuildVegCalendar();
+  if (calendar.entries.size() > kMostCrops) {
+    development.problem = fmt::format("the calendar has {} crops, more than {}", calendar.entries.size(), kMostCrops);
+    return development;
+  }
+  std::map<const CTvnVegPropFile*, CTvnVegPropStageDataList> stages;
+  for (int number = 1; number <= GetItemCount(); ++number) {
+    const CTvnVegPropFile& file = GetItem(number)->VegPropFile();
+    stages[&file] = file.Stages();
+  }
+  return DevelopmentOf(calendar.entries,
+                       [&](const CTvnVegPropFile& file) -> const CTvnVegPropStageDataList& { return stages.at(&file); },
+                       {start.SecondsSinceEpoch(), period->SIMEND.SecondsSinceEpoch()});
 }
 
 int CVegetationListKvf::ValidateData() {

@@ -8,6 +8,7 @@
 
 #include "core/list.h"
 #include "surface/crop_calendar.h"
+#include "surface/crop_course.h"
 #include "surface/vegetation_file.h"
 
 namespace tervane {
@@ -48,6 +49,8 @@ class CVegetationListKvf : public CYbSEKvfAbstractListBase<CVegetationItemKvf> {
   std::unique_ptr<CVegetationItemKvf> NewItem() override;
   /// The crops up to the end of the simulation, as of the latest validation.
   CropCalendar BuildVegCalendar() const;
+  /// What the crops come to over the simulation.
+  CropDevelopment Development() const;
   /// Warns of a calendar that is cut.
   int ValidateData() override;
 

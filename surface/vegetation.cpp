@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "surface/vegetation.h"
 
+#include <cmath>
+
 #include "platform/item_types.h"
 #include "simspec/conditions.h"
 #include "spatial/stations.h"
@@ -20,6 +22,41 @@ CFMData0DFile* NewSeriesFile(CYbSEKvfBase& node, const char* section, const char
   file->SetItemType(itemType);
   file->SetOldSectionName(kLastVersionOfOneSectionName, "TIME_SERIES_FILE");
   return file;
+}
+
+/// One of the two quantities.
+struct Quantity {
+  const char* title;
+  int itemType;
+  float VegetationCourse::*constant;
+  CFMData0DFile& (VegetationCourse::*seriesFile)() const;
+  std::vector<double> CropCourse::*ofCrops;
+  CFMData2DNdsFile& (CVegetationFullyDistKvf::*gridFile)() const;
+};
+constexpr Quantity kQuantities[] = {
+    {"Leaf Area Index", quantity::kLeafAreaIndex, &VegetationCourse::FIXED_VALUE_LAI, &VegetationCourse::LaiFile,
+     &CropCourse::lai, &CVegetationFullyDistKvf::LaiFile},
+    {"Root Depth", quantity::kRootDepth, &VegetationCourse::FIXED_VALUE_RD, &VegetationCourse::RootDepthFile,
+     &CropCourse::rootDepth, &CVegetationFullyDistKvf::RootDepthFile}};
+
+ForcingSeries SeriesOfCrops(const CVegetationListKvf& crops, const Quantity& quantity) {
+  ForcingSeries series;
+  const CropDevelopment development = crops.Development();
+  series.problem = development.problem;
+  if (!series.problem.empty()) return series;
+  const std::vector<std::int64_t>& times = development.course.times;
+  const std::vector<double>& values = development.course.*quantity.ofCrops;
+  series.lines.emplace();
+  for (std::size_t i = 1; i < times.size(); ++i)
+    if (times[i] > times[i - 1] && !std::isnan(values[i]) && !std::isnan(values[i - 1]))
+      series.lines->push_back({times[i - 1], times[i], values[i - 1], values[i]});
+  return series;
+}
+
+ForcingSeries SeriesOf(const VegetationCourse& course, const Quantity& quantity) {
+  if (course.TYPE == VegetationCourse::kCrops) return SeriesOfCrops(course.Crops(), quantity);
+  return ForcingSeriesOf(course.TYPE == VegetationCourse::kTimeVarying, course.*quantity.constant,
+                         (course.*quantity.seriesFile)());
 }
 
 /// A grid of one quantity.
@@ -99,6 +136,34 @@ CVegetationKvf::CVegetationKvf(CYbSEKvfBase* parent)
 
 std::shared_ptr<CFMSEKvfGroupBase> CVegetationKvf::CreateStationItem() {
   return std::make_shared<CVegetationTimeSeriesKvf>(this);
+}
+
+std::vector<Forcing> CVegetationKvf::CurrentForcings() const {
+  std::vector<Forcing> forcings;
+  if (DistributionType == kFullyDistributed && fully_->TYPE == CVegetationFullyDistKvf::kConstant) return forcings;
+  for (const Quantity& quantity : kQuantities) {
+    Forcing& forcing = forcings.emplace_back();
+    forcing.title = quantity.title;
+    forcing.itemType = quantity.itemType;
+    if (DistributionType == kFullyDistributed) {
+      forcing.overGrid = ForcingSeriesOf((*fully_.*quantity.gridFile)());
+      continue;
+    }
+    if (DistributionType != kStationBased) {
+      forcing.series.push_back(SeriesOf(*global_, quantity));
+      continue;
+    }
+    forcing.areas = Stations().CurrentSource();
+    for (const CFMSEKvfGroupBase* item : ZoneItems(*this)) {
+      const auto* station = dynamic_cast<const CVegetationTimeSeriesKvf*>(item);
+      if (!station) continue;
+      ForcingSeries series = SeriesOf(*station, quantity);
+      series.name = station->NAME;
+      series.id = station->GRIDCODEID;
+      forcing.series.push_back(std::move(series));
+    }
+  }
+  return forcings;
 }
 
 void CVegetationKvf::ExchangeKeys(KeyExchange& keys) {

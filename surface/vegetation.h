@@ -7,7 +7,9 @@
 
 #include <array>
 #include <memory>
+#include <vector>
 
+#include "spatial/data_use.h"
 #include "spatial/file_nodes.h"
 #include "spatial/station_owner.h"
 #include "surface/crop_list.h"
@@ -91,12 +93,8 @@ class CVegetationFullyDistKvf : public CTvnKvfBase {
   std::array<CFMData2DNdsFile*, 2> files_;
 };
 
-/// The vegetation.
-class CVegetationKvf : public StationOwnerKvf {
- public:
-  explicit CVegetationKvf(CYbSEKvfBase* parent);
-
-  // The parameters of evapotranspiration.
+/// The parameters of evapotranspiration.
+struct EvapotranspirationParameters {
   double C1 = 0.3;
   double C2 = 0.2;
   double C3 = 20;
@@ -104,10 +102,20 @@ class CVegetationKvf : public StationOwnerKvf {
   double A_ROOT = 0.25;    ///< How fast roots thin out with depth.
   double ETReduced = 1.0;  ///< The part of the deficit below which roots take up less.
 
+  bool operator==(const EvapotranspirationParameters&) const = default;
+};
+
+/// The vegetation.
+class CVegetationKvf : public StationOwnerKvf, public EvapotranspirationParameters, public ForcingNode {
+ public:
+  explicit CVegetationKvf(CYbSEKvfBase* parent);
+
   CVegetationGlobalKvf& Global() const { return *global_; }
   CVegetationFullyDistKvf& FullyDistributed() const { return *fully_; }
 
   std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
+  /// Both quantities. Grids that do not change drive nothing over time.
+  std::vector<Forcing> CurrentForcings() const override;
 
  protected:
   KeyChoices Distributions() const override { return kVegetationDistributions; }

@@ -19,7 +19,7 @@ class CTvnVegPropFile : public CTvnKvfBase {
   explicit CTvnVegPropFile(CYbSEKvfBase* parent) : CTvnKvfBase("Vegetation property file", "VEG_PROP_FILE", parent) {}
 
   FileName File;
-  std::vector<std::string> VegetationNames;  ///< The first counts.
+  std::vector<std::string> VegetationNames{std::string()};  ///< The first counts.
 
   std::string VegetationName() const { return VegetationNames.empty() ? std::string() : VegetationNames.front(); }
   /// Keeps the names behind the first.

@@ -84,13 +84,12 @@ std::optional<FileName> RunDialog(const PageContext& context, const char* title,
   return context.runDialog(title, dialog, create) ? std::optional(file) : std::nullopt;
 }
 
-/// A dialog changes no setup.
+}  // namespace
+
 PageContext WithoutDocument(PageContext context) {
   context.updateDoc = {};
   return context;
 }
-
-}  // namespace
 
 // ---- Grids
 

@@ -14,6 +14,9 @@
 
 namespace tervane {
 
+/// For a dialog, which changes no setup.
+PageContext WithoutDocument(PageContext context);
+
 /// A grid file with the geometry of the model and one value everywhere, or the values of a text file.
 class CData2DNdsCreateDlg : public CYbSEDlgBase {
  public:

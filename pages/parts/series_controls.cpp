@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/parts/series_controls.h"
 
+#include <fmt/format.h>
+
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/file_controls.h"
 
@@ -18,6 +20,7 @@ void DescribeSeriesFile(PageForm& form, const CYbSEDlgBase& page, const std::str
   form.Button("Create...",
               [&page, &file, first = std::move(first)] {
                 CTvnCreate0DNdsDlg dialog(page.Context(), page.Node(), first.value, first.itemTypes, first.valueTypes);
+                if (*first.quantity) dialog.SetTitle(fmt::format("{} {}", page.Node().GetTitle(), first.quantity));
                 if (const auto made = dialog.Run()) {
                   file.Choose(*made);
                   page.UpdateDoc(kDataChanged, "Create Time Series File");

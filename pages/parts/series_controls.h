@@ -16,6 +16,7 @@ struct FirstSeries {
   const float& value;
   std::vector<int> itemTypes;
   std::vector<int> valueTypes = {};
+  const char* quantity = "";  ///< Where the page has several: told in the title of the file.
 };
 
 /// The controls of a file of a series: the file, and buttons that show it and make a first one.

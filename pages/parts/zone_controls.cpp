@@ -119,8 +119,9 @@ void DescribeZoneSource(PageForm& form, const CYbSEDlgBase& page, ZoneSource& so
           .ShownWhen(byCodes);
   if (words.isEditBeside) edit.Beside();
   form.Button("Create...",
-              [&page, &source, sync] {
-                CData2DNdsCreateDlg dialog(page.Context(), 1.0F, page.Node(), quantity::kCode);
+              [&page, &source, sync, newCode = words.newCode] {
+                CData2DNdsCreateDlg dialog(page.Context(), newCode ? newCode(page.Node()) : 1.0F, page.Node(),
+                                           quantity::kCode);
                 if (const auto file = dialog.Run()) {
                   source.GridFile().Choose(*file);
                   page.UpdateDoc(sync(), "Create Grid File");

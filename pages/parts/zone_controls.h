@@ -25,6 +25,8 @@ struct ZoneSourceWords {
   const char* units = "Units of X- and Y-axises:";
   bool isEditBeside = true;        ///< The button stands beside the grid file; else it begins a row.
   bool isTypeAlwaysShown = false;  ///< The kind of source is shown also where one zone serves the whole area.
+  /// Of the cells of a new grid, by the node of the page; 1 where nothing is said.
+  float (*newCode)(const CYbSEKvfBase& node) = nullptr;
 };
 
 /// The controls of the files of a source. The choice of the kind of source stands above them, told by the page.

@@ -17,6 +17,7 @@
 #include "spatial/domain.h"
 #include "spatial/zones.h"
 #include "surface/climate.h"
+#include "surface/vegetation.h"
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -134,6 +135,26 @@ TEST_F(EngineProgram, TakesTheMeanOfTheStepsOfTheSimulation) {
 }
 
 /// A real catchment with stations, snow and zones.
+TEST_F(EngineProgram, TellsWhichCropGrowsWhen) {
+  folder.Write("crops.etv",
+               "target TERVANE_VEGETATION {\nsection Vegetation_1 {\nName = \"Rye\"\nStage = 0, 1.0, 0.2, 0.3\n"
+               "Stage = 10, 2.0, 1.0, 1.0\n}\n}\n");
+  CVegetationKvf& vegetation = *document.Root().Important(kVegetation);
+  vegetation.Global().FIXED_VALUE_LAI = 3;
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("Leaf area index 3, root depth 0 m, constant"));
+  vegetation.Global().TYPE = VegetationCourse::kCrops;
+  CVegetationItemKvf& crop = *vegetation.Global().Crops().AddItem();
+  crop.StartDate = {2000, 1, 5};
+  crop.VegPropFile().Choose(FileName("crops.etv", folder.Path()), "Rye");
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(test::ReadFile(ReportPath()),
+              HasSubstr("2000-01-01 to 2000-01-05: no crop\\n2000-01-05 to 2000-01-15: Rye\\n"));
+  crop.VegPropFile().SetVegetationName("Rice");
+  ASSERT_EQ(Run("/PP"), kEngineFailed);
+  EXPECT_THAT(log, HasSubstr("has no vegetation \"Rice\""));
+}
+
 TEST(EngineProgramExample, ReportsTheRhone) {
   test::TempFolder folder;
   std::filesystem::copy(std::string(TERVANE_SOURCE_DIR) + "/examples/rhone", folder.Path(),
