@@ -4,6 +4,10 @@
 
 #include <chrono>
 #include <map>
+#include <string>
+#include <unordered_map>
+#include <utility>
+#include <vector>
 
 #include <fmt/format.h>
 
@@ -15,6 +19,10 @@ namespace tervane {
 namespace {
 
 const CYbDateTime kLastDate{9999, 12, 31};
+
+CYbDateTimeSpan LengthOf(const CTvnVegPropStageDataList& stages) {
+  return CYbDateTimeSpan::Days(stages.empty() ? 0 : stages.back().DayStamp());
+}
 
 CYbDateTime Now() {
   const auto now = std::chrono::system_clock::now().time_since_epoch();
@@ -32,10 +40,7 @@ CVegetationItemKvf::CVegetationItemKvf(const Condition& isUsed, CYbSEKvfBase* pa
   file_->UsedWhen(isUsed);
 }
 
-CYbDateTimeSpan CVegetationItemKvf::Length() const {
-  const CTvnVegPropStageDataList stages = file_->Stages();
-  return CYbDateTimeSpan::Days(stages.empty() ? 0 : stages.back().DayStamp());
-}
+CYbDateTimeSpan CVegetationItemKvf::Length() const { return LengthOf(file_->Stages()); }
 
 CYbDateTime CVegetationItemKvf::GetEndDate() const {
   if (!StartDate.IsValid()) return StartDate;
@@ -70,19 +75,45 @@ void CVegetationItemKvf::ExchangeKeys(KeyExchange& keys) { keys.Day("STARTDATE",
 CVegetationListKvf::CVegetationListKvf(Condition isUsed, CYbSEKvfBase* parent)
     : CYbSEKvfAbstractListBase("VegPropFile", "VEG_PROP_FILES", parent), isUsed_(std::move(isUsed)) {}
 
+namespace {
+
+/// The stages of crops, of which many may be one vegetation.
+class StageLookup {
+ public:
+  const CTvnVegPropStageDataList& Of(const CTvnVegPropFile& file) {
+    const auto [known, isNew] = byFile_.try_emplace(&file);
+    if (!isNew) return *known->second;
+    const auto [found, isRead] = byName_.try_emplace({file.File.Absolute(), file.VegetationName()});
+    if (isRead) found->second = file.Stages();
+    known->second = &found->second;
+    return found->second;
+  }
+
+ private:
+  std::map<std::pair<std::string, std::string>, CTvnVegPropStageDataList> byName_;
+  std::unordered_map<const CTvnVegPropFile*, const CTvnVegPropStageDataList*> byFile_;
+};
+
+CropCalendar CalendarOf(const CVegetationListKvf& list, StageLookup& stages) {
+  const auto* period = list.Important(kSimulationPeriod);
+  if (!period) return {};
+  std::vector<PlannedCrop> crops;
+  for (int number = 1; number <= list.GetItemCount(); ++number) {
+    const CVegetationItemKvf& item = *list.GetItem(number);
+    crops.push_back({&item.VegPropFile(), item.StartDate, LengthOf(stages.Of(item.VegPropFile())), item.Valid() != 0});
+  }
+  return BuildVegCalendar(crops, list.RecycleMode, period->SIMEND);
+}
+
+}  // namespace
+
 std::unique_ptr<CVegetationItemKvf> CVegetationListKvf::NewItem() {
   return std::make_unique<CVegetationItemKvf>(isUsed_, this);
 }
 
 CropCalendar CVegetationListKvf::BuildVegCalendar() const {
-  const auto* period = Important(kSimulationPeriod);
-  if (!period) return {};
-  std::vector<PlannedCrop> crops;
-  for (int number = 1; number <= GetItemCount(); ++number) {
-    const CVegetationItemKvf& item = *GetItem(number);
-    crops.push_back({&item.VegPropFile(), item.StartDate, item.Length(), item.Valid() != 0});
-  }
-  return tervane::BuildVegCalendar(crops, RecycleMode, period->SIMEND);
+  StageLookup stages;
+  return CalendarOf(*this, stages);
 }
 
 CropDevelopment CVegetationListKvf::Development() const {
@@ -95,19 +126,16 @@ CropDevelopment CVegetationListKvf::Development() const {
     development.problem = "the dates of the simulation are none, or in no order";
     return development;
   }
-  const CropCalendar calendar = BuildVegCalendar();
+  StageLookup stages;
+  const CropCalendar calendar = CalendarOf(*this, stages);
   if (calendar.entries.size() > kMostCrops) {
     development.problem = fmt::format("the calendar has {} crops, more than {}", calendar.entries.size(), kMostCrops);
     return development;
   }
-  std::map<const CTvnVegPropFile*, CTvnVegPropStageDataList> stages;
-  for (int number = 1; number <= GetItemCount(); ++number) {
-    const CTvnVegPropFile& file = GetItem(number)->VegPropFile();
-    stages[&file] = file.Stages();
-  }
-  return DevelopmentOf(calendar.entries,
-                       [&](const CTvnVegPropFile& file) -> const CTvnVegPropStageDataList& { return stages.at(&file); },
-                       {start.SecondsSinceEpoch(), period->SIMEND.SecondsSinceEpoch()});
+  return DevelopmentOf(
+      calendar.entries,
+      [&](const CTvnVegPropFile& file) -> const CTvnVegPropStageDataList& { return stages.Of(file); },
+      {start.SecondsSinceEpoch(), period->SIMEND.SecondsSinceEpoch()});
 }
 
 int CVegetationListKvf::ValidateData() {

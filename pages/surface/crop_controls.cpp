@@ -96,14 +96,16 @@ std::shared_ptr<TableOf<Item>> CropControls::CVegetationGrid() const {
       ->Value(
           "Name", [](Item& crop) { return crop.VegPropFile().VegetationName(); },
           [](Item& crop, const std::string& name) { crop.VegPropFile().SetVegetationName(name); })
-      .Width(85);
+      .Width(85)
+      .Key("VEGETATION");
   table
       ->Value(
           "Start date", [](Item& crop) { return crop.StartDate; },
           [](Item& crop, const CYbDateTime& date) { crop.StartDate = Midnight(date); })
       .ShownAs([](Item& crop) { return DateText(crop.StartDate); })
       .Width(130)
-      .Hint(kTreeRebuilt);
+      .Hint(kTreeRebuilt)
+      .Key("STARTDATE");
   table
       ->Value("Stages End",
               [](Item& crop) { return crop.StartDate.IsValid() ? DateText(crop.GetEndDate()) : std::string(); })
@@ -111,6 +113,7 @@ std::shared_ptr<TableOf<Item>> CropControls::CVegetationGrid() const {
       .GreyWhen([](Item&) { return true; });
   table->Value("Vegetation property file", [](Item& crop) -> FileName& { return crop.VegPropFile().File; })
       .Width(290)
+      .Key("FILE_NAME")
       .Filter(std::string(kVegetationLibrary.filter))
       .DefaultExtension(std::string(kVegetationLibrary.extension))
       .ToolTipOf([](Item& crop) { return crop.VegPropFile().File.Text(); });
