@@ -17,7 +17,7 @@ void ZoneAreaTable::Describe(PageForm& form, const CYbSEDlgBase& page) {
   table->Value("Code", [](const Row& row) { return row.id; }).Width(60);
   table->Value("Area", [](const Row& row) { return row.area; }).Width(80).Unit("km²").Format("%.6g");
   table->Value("Share", [](const Row& row) { return row.share; })
-      .Width(80)
+      .Width(70)
       .Unit("%")
       .Format("%.2f")
       .ToolTip("Of the cells of the model domain");

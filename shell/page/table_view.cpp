@@ -90,7 +90,7 @@ void TableView::MakeView() {
   static_cast<QVBoxLayout*>(layout())->addWidget(view_, 1);
   if (!control_.table->IsShownOnly()) return;
   view_->setSelectionBehavior(QAbstractItemView::SelectRows);
-  view_->setMinimumWidth(theme.Scaled(kTableWidth));
+  view_->setMinimumWidth(std::min(theme.Scaled(kTableWidth), WidthOfColumns()));
   view_->verticalHeader()->setVisible(control_.table->HasRowHeads());
 }
 
@@ -373,6 +373,15 @@ void TableView::resizeEvent(QResizeEvent* event) {
   // Columns that do not fit begin narrower; from then on they are the user's. What is only shown follows its room.
   hasFittedColumns_ = !control_.table->IsShownOnly();
   FitColumns();
+}
+
+int TableView::WidthOfColumns() const {
+  // A table that makes its columns later needs its room.
+  if (model_->columnCount() == 0) return Theme::Get().Scaled(kTableWidth);
+  int width = 2 * view_->frameWidth() + style()->pixelMetric(QStyle::PM_ScrollBarExtent);
+  for (int column = 1; column <= model_->columnCount(); ++column)
+    width += Theme::Get().Scaled(control_.table->Column(column)->width);
+  return width;
 }
 
 void TableView::FitColumns() {

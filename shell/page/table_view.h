@@ -62,6 +62,8 @@ class TableView : public QWidget {
   void OpenList();
   void ShowResult(const CellsResult& result, const QString& done);
   void SyncButtons();
+  /// Of all columns as they begin, with the edges of the table.
+  int WidthOfColumns() const;
   void FitColumns();
   void OfferUnits(int column, const QPoint& place);
 
