@@ -24,7 +24,7 @@ namespace {
 
 std::string JunctionText(std::string_view end, const RiverJunction& junction) {
   return junction.IsNone() ? std::string()
-                           : fmt::format(", {} end at {} {}", end, junction.branch, ShortestNumber(junction.chainage));
+                           : fmt::format(", {} end at {} {:.1f}", end, junction.branch, junction.chainage);
 }
 
 double LengthOf(const CYbSimpleRiverData& network) {

@@ -70,6 +70,9 @@ class LineReader {
     if (!FindNames()) return;
     std::size_t number = 0;
     for (const Shape& shape : shapes_.GetData()) ReadShape(shape, ++number);
+    if (renamed_ > 0)
+      import_.warnings.push_back(fmt::format("{} line{} the name of another one: a number stands behind {}", renamed_,
+                                             renamed_ == 1 ? " has" : "s have", renamed_ == 1 ? "it" : "it in each"));
     if (import_.branches.empty()) import_.error = "there are no lines of which branches could be made";
   }
 
@@ -137,6 +140,7 @@ class LineReader {
 
   std::string FreeName(const std::string& wanted) {
     if (names_.insert(wanted).second) return wanted;
+    ++renamed_;
     int& number = latest_.try_emplace(wanted, 1).first->second;
     std::string name;
     do name = fmt::format("{} {}", wanted, ++number);
@@ -164,6 +168,7 @@ class LineReader {
   std::size_t nameColumn_ = static_cast<std::size_t>(-1);
   std::unordered_set<std::string> names_;
   std::unordered_map<std::string, int> latest_;
+  std::size_t renamed_ = 0;
 };
 
 // ---- Junctions

@@ -109,6 +109,7 @@ TEST_F(RiverImportTest, WhatIsOddIsToldAndNothingIsHidden) {
                   "shape 3 (Two) has 2 parts: each is a branch", "Sliver (shape 4) is only 60.0 m long, at 3000.0, 0.0",
                   "Ring (shape 5) ends where it begins, at 5000.0, 0.0",
                   "shape 8 (Not) has a coordinate that is no number and is left out",
+                  "1 line has the name of another one: a number stands behind it",
                   "Ring 2 nearly meets Gap: 6.25 m are between them, at 7000.0, 500.0"));
 }
 
