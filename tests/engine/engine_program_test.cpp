@@ -18,6 +18,7 @@
 #include "spatial/zones.h"
 #include "surface/climate.h"
 #include "surface/vegetation.h"
+#include "surface/rivers.h"
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -110,6 +111,24 @@ TEST_F(EngineProgram, TellsCellsWithoutValueAndZonesByName) {
   ASSERT_EQ(Run("/PP"), kEngineDone) << log;
   EXPECT_THAT(log, HasSubstr("warning: Subcatchments: 7 cells of the domain have no Subcatchments"));
   EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("8, Upper valley: 0.03 km2"));
+}
+
+TEST_F(EngineProgram, LeavesTheRiverNetworkAsLines) {
+  folder.Write("net.fvnwk",
+               "target FLUVANE_Network_editor {\n  section POINTS {\n    Point = 1, 1000, 2100, 0\n"
+               "    Point = 2, 1400, 2100, 400\n    Point = 3, 1, 1, 1\n  }\n  section BRANCHES {\n"
+               "    section Branch_1 {\n      Name = \"Rhone\"\n      Points = 1, 2\n    }\n  }\n}\n");
+  folder.Write("run.fvsim", "target FvRun {\n  section input {\n    nwk = \"net.fvnwk\"\n  }\n}\n");
+  document.Root().Important(kModelComponents)->River = 1;
+  dynamic_cast<CRiverKvf&>(*document.Root().Important(kRiver)).SetRiverFile(FileName("run.fvsim", folder.Path()));
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(log, HasSubstr("net.fvnwk:5: point 3 belongs to no branch"));
+  EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("SHAPE_PLOT"));
+  CYbShapeData lines;
+  ASSERT_TRUE(lines.ReadShapeAndDbfFile(folder.File("a_results/a_PreProcessed_Rivers.shp"), "NAME").Ok());
+  ASSERT_EQ(lines.GetData().size(), 1U);
+  EXPECT_EQ(TextOf(lines.GetData()[0].Value()), "Rhone");
+  EXPECT_EQ(lines.GetData()[0].points.back(), (MapPoint{1400, 2100}));
 }
 
 TEST_F(EngineProgram, TakesTheMeanOfTheStepsOfTheSimulation) {
