@@ -58,7 +58,9 @@ class TablePage : public CYbSEDlgBase {
     table = std::make_shared<TableOf<Row>>(rows);
     table->ItemName("Season");
     table->RowHeads([](Row& row) { return row.name.empty() ? "?" : row.name.substr(0, 2); });
-    table->Value("Name", &Row::name).Width(90).Hint(kDataChanged | kTreeRebuilt);
+    table->Value("Name", &Row::name).Width(90).Hint(kDataChanged | kTreeRebuilt).Offers([](Row& row) {
+      return std::vector<std::string>{row.days < 100 ? "Month" : "Half-year", "Winter"};
+    });
     table->Value("Start", &Row::start).Width(150);
     table->Value("Length", &Row::days).Width(90).Unit("days").Format("%.6g");
     table

@@ -2,8 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/page/table_view.h"
 
+#include <QAbstractItemView>
 #include <QCalendarWidget>
 #include <QComboBox>
+#include <QCompleter>
 #include <QHeaderView>
 #include <QTableView>
 #include <QToolButton>
@@ -294,6 +296,31 @@ TEST(TableView, ADateIsChosenInTheCalendarOfItsCell) {
   EXPECT_EQ(calendar->selectedDate(), QDate(2000, 9, 1));
   emit calendar->activated(QDate(2002, 3, 4));
   EXPECT_EQ(table.Row(3).start, CYbDateTime(2002, 3, 4, 12, 30)) << "the time of day stays";
+}
+
+TEST(TableView, ATextOffersWhatItsRowKnowsAndTakesAnyOther) {
+  ShownTable table;
+  const auto open = [&](int row) {
+    QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+    table.GoTo(row, kName);
+    table.Press(Qt::Key_F2);
+    return table.Cells().findChild<QLineEdit*>();
+  };
+  QLineEdit* edit = open(2);
+  ASSERT_TRUE(edit && edit->completer());
+  edit->actions().constLast()->trigger();
+  EXPECT_TRUE(edit->completer()->popup()->isVisible());
+  EXPECT_EQ(edit->completer()->model()->index(0, 0).data().toString(), "Half-year");
+  EXPECT_EQ(edit->completer()->completionCount(), 2) << "all of them, whatever the cell holds";
+  emit edit->completer()->activated(QString("Winter"));
+  EXPECT_EQ(table.Row(2).name, "Winter");
+  edit = open(2);
+  edit->selectAll();
+  table.Type("alf");
+  EXPECT_EQ(edit->completer()->completionCount(), 1) << "those that hold what is typed";
+  table.Type("red");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Row(2).name, "alfred");
 }
 
 TEST(TableView, AChoiceOffersWhatItsRowHas) {
