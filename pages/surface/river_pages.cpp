@@ -12,6 +12,8 @@ namespace tervane {
 
 namespace {
 
+/// Transparency of the domain below the rivers.
+constexpr double kQuiet = 0.7;
 constexpr int kFollowedByTree = kDataChanged | kTreeRebuilt;
 
 void EditButton(PageForm& form, const CYbSEDlgBase& page, const FileName& file, const Condition& isShown = {}) {
@@ -70,7 +72,10 @@ class CRiverMFDlg : public PageOf<CRiverMFKvf> {
     form.Check("Show Rivers map", n.IncludeMap);
     Control& map = form.Map([&n] {
       MapContent content = DomainMap(n);
-      for (GridLayer& grid : content.grids) grid.withLegend = false;
+      for (GridLayer& grid : content.grids) {
+        grid.withLegend = false;
+        grid.transparency = kQuiet;
+      }
       AddRiver(content, n.Filename);
       return content;
     });
