@@ -372,6 +372,48 @@ FileResult WriteFileAtomically(const std::string& path, std::string_view content
   return OutcomeOfWrite(path, target.reason, target.status, note);
 }
 
+void CreateWholeFile(const std::string& path, std::string_view content, std::error_code& error) {
+  const fs::path target = NativePath(path);
+  const auto fill = [&](os::File& file) {
+    if (!error) file.WriteAll(content, error);
+    if (!error) file.Flush(error);
+    if (!error) file.Close(error);
+  };
+  RemoveStaleTemporaries(target);
+  TemporaryFile temporary;
+  temporary.Create(target, os::File::Access::AsMaskAllows, error);
+  fill(temporary.file);
+  if (error) return;
+  os::RenameToNew(temporary.Path(), path, error);
+  if (!error) return temporary.WasRenamed();
+  if (error == std::errc::file_exists) return;
+  // Some shared folders know no renaming that spares what stands there.
+  os::File file = os::File::CreateNew(path, os::File::Access::AsMaskAllows, error);
+  if (error) return;
+  fill(file);
+  std::error_code ignored;
+  if (error) fs::remove(target, ignored);
+}
+
+std::string WhyNoOwnFile(const std::string& path) {
+  std::error_code error;
+  const fs::file_status status = fs::symlink_status(NativePath(path), error);
+  if (!fs::exists(status) || fs::is_regular_file(status)) return {};
+  return fs::is_symlink(status) ? "it is a symbolic link" : WhyNotRegular(fs::is_directory(status));
+}
+
+FileResult WriteOwnFileAtomically(const std::string& path, std::string_view content) {
+  Reason reason = WhyNoPath(path);
+  if (reason.empty()) reason = WhyNoOwnFile(path);
+  os::File old;
+  os::File::Status status;
+  std::string note;
+  if (reason.empty()) reason = OpenOldFile(NativePath(path), old, status);
+  // The rename replaces a link that came into being meanwhile, and not what it leads to.
+  if (reason.empty()) reason = Publish(NativePath(path), content, std::move(old), os::RenameOver, note);
+  return OutcomeOfWrite(path, reason, status, note);
+}
+
 struct FileReplacement::State {
   std::string name;
   fs::path target;

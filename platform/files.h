@@ -47,6 +47,17 @@ FileResult ReadWholeFile(const std::string& path, FileContent& content, Progress
 /// stands byte for byte and nothing is left beside it.
 FileResult WriteFileAtomically(const std::string& path, std::string_view content);
 
+/// Makes a file that must not exist yet (else `error` is `file_exists`), with its content from the first moment where
+/// the file system can do that.
+void CreateWholeFile(const std::string& path, std::string_view content, std::error_code& error);
+
+/// The same for a file of the program's own, at whose name users keep nothing: a symbolic link is refused, so that no
+/// file elsewhere is written.
+FileResult WriteOwnFileAtomically(const std::string& path, std::string_view content);
+/// Why the program's own file cannot stand there: something else does, such as a symbolic link, a folder or a FIFO.
+/// Empty where a regular file or nothing stands.
+std::string WhyNoOwnFile(const std::string& path);
+
 /// A file that a library writes under a temporary name, put in place in one step like an atomic write. What was not
 /// committed is removed.
 class FileReplacement {

@@ -33,6 +33,7 @@
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <locale.h>
+#include <poll.h>
 #include <pwd.h>
 #include <signal.h>
 #include <sys/file.h>
@@ -45,6 +46,17 @@
 #endif
 
 namespace tervane::os {
+
+namespace {
+
+/// Closes what is no regular file, and says so.
+void RefuseUnlessRegular(File& file, std::error_code& error) {
+  const File::Status status = file.GetStatus(error);
+  if (!error && !status.isRegular) error = std::make_error_code(std::errc::invalid_argument);
+  if (error) file = File();
+}
+
+}  // namespace
 
 #ifdef _WIN32
 
@@ -65,6 +77,9 @@ void PrepareProcess() {
   SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOOPENFILEERRORBOX);
 }
 
+// A closed pipe shows at the next write alone.
+bool IsOutputClosed() { return GetLastError() == ERROR_NO_DATA || GetLastError() == ERROR_BROKEN_PIPE; }
+
 File::File(File&& other) noexcept : handle_(std::exchange(other.handle_, nullptr)) {}
 
 File& File::operator=(File&& other) noexcept {
@@ -76,11 +91,11 @@ File::~File() {
   if (handle_) CloseHandle(handle_);
 }
 
-File File::OpenForReading(const std::string& path, std::error_code& error) {
+File File::OpenForReading(const std::string& path, std::error_code& error, Links links) {
   File file;
   // The flag lets a folder be opened, so that its status can tell what it is.
-  void* handle = CreateFileW(Wide(path).c_str(), GENERIC_READ, kShareAll, nullptr, OPEN_EXISTING,
-                             FILE_FLAG_BACKUP_SEMANTICS, nullptr);
+  const DWORD flags = FILE_FLAG_BACKUP_SEMANTICS | (links == Links::Refuse ? FILE_FLAG_OPEN_REPARSE_POINT : 0);
+  void* handle = CreateFileW(Wide(path).c_str(), GENERIC_READ, kShareAll, nullptr, OPEN_EXISTING, flags, nullptr);
   SetError(handle != INVALID_HANDLE_VALUE, error);
   if (!error) file.handle_ = handle;
   return file;
@@ -99,9 +114,10 @@ File File::CreateNew(const std::string& path, Access, std::error_code& error) {
 File File::OpenOrCreate(const std::string& path, std::error_code& error) {
   File file;
   void* handle = CreateFileW(Wide(path).c_str(), GENERIC_READ | GENERIC_WRITE, kShareAll, nullptr, OPEN_ALWAYS,
-                             FILE_ATTRIBUTE_NORMAL, nullptr);
+                             FILE_ATTRIBUTE_NORMAL | FILE_FLAG_OPEN_REPARSE_POINT, nullptr);
   SetError(handle != INVALID_HANDLE_VALUE, error);
   if (!error) file.handle_ = handle;
+  if (!error) RefuseUnlessRegular(file, error);
   return file;
 }
 
@@ -347,6 +363,11 @@ void PrepareProcess() {
   signal(SIGPIPE, SIG_IGN);
 }
 
+bool IsOutputClosed() {
+  pollfd output{STDOUT_FILENO, POLLOUT, 0};
+  return poll(&output, 1, 0) > 0 && (output.revents & POLLERR) != 0;
+}
+
 File::File(File&& other) noexcept : descriptor_(std::exchange(other.descriptor_, -1)) {}
 
 File& File::operator=(File&& other) noexcept {
@@ -358,9 +379,10 @@ File::~File() {
   if (descriptor_ >= 0) close(descriptor_);
 }
 
-File File::OpenForReading(const std::string& path, std::error_code& error) {
+File File::OpenForReading(const std::string& path, std::error_code& error, Links links) {
   File file;
-  file.descriptor_ = Checked(error, [&] { return open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC); });
+  const int flags = O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC | (links == Links::Refuse ? O_NOFOLLOW : 0);
+  file.descriptor_ = Checked(error, [&] { return open(path.c_str(), flags); });
   return file;
 }
 
@@ -374,7 +396,9 @@ File File::CreateNew(const std::string& path, Access access, std::error_code& er
 
 File File::OpenOrCreate(const std::string& path, std::error_code& error) {
   File file;
-  file.descriptor_ = Checked(error, [&] { return open(path.c_str(), O_RDWR | O_CREAT | O_NOCTTY | O_CLOEXEC, 0666); });
+  constexpr int kFlags = O_RDWR | O_CREAT | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC;
+  file.descriptor_ = Checked(error, [&] { return open(path.c_str(), kFlags, 0666); });
+  if (!error) RefuseUnlessRegular(file, error);
   return file;
 }
 

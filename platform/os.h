@@ -18,6 +18,9 @@ namespace tervane::os {
 /// it, not the end of the process.
 void PrepareProcess();
 
+/// True when nobody reads the standard output any more, as behind `| head`.
+bool IsOutputClosed();
+
 /// An open file. Closed by the destructor; `Close` tells the error that a close can report.
 class File {
  public:
@@ -28,12 +31,15 @@ class File {
   File& operator=(const File&) = delete;
   ~File();
 
-  /// Opens for reading without waiting for a writer (FIFO).
-  static File OpenForReading(const std::string& path, std::error_code& error);
+  /// Opens for reading without waiting for a writer (FIFO). What is to be a file of the program's own is not looked for
+  /// behind a symbolic link.
+  enum class Links { Follow, Refuse };
+  static File OpenForReading(const std::string& path, std::error_code& error, Links links = Links::Follow);
   /// Creates a file that must not exist yet, readable and writable as the process's mask allows, or by its owner only.
   enum class Access { AsMaskAllows, OwnerOnly };
   static File CreateNew(const std::string& path, Access access, std::error_code& error);
-  /// Opens for reading and writing what stands there, or creates an empty file.
+  /// Opens a file of the program's own for reading and writing, or creates an empty one. Symbolic links and what is no
+  /// regular file are refused, and nothing is waited for.
   static File OpenOrCreate(const std::string& path, std::error_code& error);
 
   bool IsOpen() const;

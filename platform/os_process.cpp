@@ -275,9 +275,11 @@ void Handle(int number) {
 pid_t Spawn(const ProgramStart& start, short group, std::error_code& error) {
   posix_spawn_file_actions_t files;
   posix_spawn_file_actions_init(&files);
+  // A file that was replaced by something else meanwhile is refused, and nothing is waited for.
+  constexpr int kOutputFlags = O_WRONLY | O_APPEND | O_CREAT | O_NOFOLLOW | O_NONBLOCK;
   const char* output = start.output.empty() ? "/dev/null" : start.output.c_str();
   posix_spawn_file_actions_addopen(&files, 0, "/dev/null", O_RDONLY, 0);
-  posix_spawn_file_actions_addopen(&files, 1, output, O_WRONLY | O_APPEND | O_CREAT, 0666);
+  posix_spawn_file_actions_addopen(&files, 1, output, kOutputFlags, 0666);
   posix_spawn_file_actions_adddup2(&files, 1, 2);
   if (!start.folder.empty()) posix_spawn_file_actions_addchdir_np(&files, start.folder.c_str());
 

@@ -12,6 +12,8 @@
 #include <utility>
 #include <vector>
 
+#include <fmt/format.h>
+
 namespace tervane {
 namespace {
 
@@ -61,6 +63,39 @@ char* Shortest(Number value, char* buffer) {
   return size >= Number(1e-3) && size < Number(1e9) ? end : ShortenExponent(buffer, end);
 }
 
+/// The code of a control character at the text's start, one or two bytes long; nothing where none stands there.
+std::optional<unsigned> ControlCode(std::string_view text) {
+  const auto first = static_cast<unsigned char>(text[0]);
+  if (first < 0x20 || first == 0x7F) return first;
+  const bool isTwoBytes = first == 0xC2 && text.size() > 1 && static_cast<unsigned char>(text[1]) < 0xA0;
+  return isTwoBytes ? std::optional<unsigned>(static_cast<unsigned char>(text[1])) : std::nullopt;
+}
+
+std::string Escaped(std::string_view text, bool keepsLines) {
+  std::string shown;
+  const auto isPlain = [](char c) { return c >= 0x20 && c < 0x7F; };
+  while (!text.empty()) {
+    const auto plain = static_cast<std::size_t>(std::find_if_not(text.begin(), text.end(), isPlain) - text.begin());
+    shown += text.substr(0, plain);
+    text.remove_prefix(plain);
+    if (text.empty()) break;
+    const std::size_t length = static_cast<unsigned char>(text[0]) < 0x80 ? 1 : MultiByteLength(text);
+    const std::optional<unsigned> control = ControlCode(text);
+    const bool isLineEnd = text[0] == '\n' || (text.size() > 1 && text[0] == '\r' && text[1] == '\n');
+    if (length == 0)
+      shown += fmt::format("\\x{:02x}", static_cast<unsigned char>(text[0]));
+    else if (!control || (keepsLines && (isLineEnd || text[0] == '\t')))
+      shown += text.substr(0, length);
+    else
+      shown += *control == '\n'   ? "\\n"
+               : *control == '\r' ? "\\r"
+               : *control == '\t' ? "\\t"
+                                  : fmt::format("\\u{{{:x}}}", *control);
+    text.remove_prefix(std::max<std::size_t>(length, 1));
+  }
+  return shown;
+}
+
 template <typename Number>
 std::string ShortestText(Number value) {
   char buffer[kNumberBuffer];
@@ -96,6 +131,10 @@ std::string Replaced(std::string_view text, std::string_view from, std::string_v
   }
   return result.append(text, done);
 }
+
+std::string OneLine(std::string_view text) { return Escaped(text, false); }
+
+std::string Printable(std::string_view text) { return Escaped(text, true); }
 
 std::optional<std::size_t> FirstInvalidUtf8(std::string_view text) {
   std::size_t place = 0;

@@ -28,6 +28,12 @@ std::string Replaced(std::string_view text, std::string_view from, std::string_v
 /// are none), or nothing when the whole text is.
 std::optional<std::size_t> FirstInvalidUtf8(std::string_view text);
 
+/// The text on one line, without what a terminal would obey: control characters as a setup writes them ("\n",
+/// "\u{1b}"), bytes that are no UTF-8 as "\xff".
+std::string OneLine(std::string_view text);
+/// The same for a text of several lines, whose line ends and tabs stay.
+std::string Printable(std::string_view text);
+
 /// FNV-1a over the bytes. Names of files are made of it, so it stays as it is.
 std::uint64_t HashOf(std::string_view text);
 

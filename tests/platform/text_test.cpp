@@ -40,6 +40,20 @@ TEST(Text, TheFirstByteThatIsNoUtf8IsFound) {
   }
 }
 
+TEST(Text, WhatATerminalWouldObeyIsShownInWords) {
+  const struct {
+    const char *text, *line, *lines;
+  } cases[] = {{"Rain \xc3\xa9\xe2\x82\xac [mm]", "Rain \xc3\xa9\xe2\x82\xac [mm]", "Rain \xc3\xa9\xe2\x82\xac [mm]"},
+               {"a\nb\tc\r\nd\re", "a\\nb\\tc\\r\\nd\\re", "a\nb\tc\r\nd\\re"},
+               {"\x1b[2J\x7f\xc2\x9b", "\\u{1b}[2J\\u{7f}\\u{9b}", "\\u{1b}[2J\\u{7f}\\u{9b}"},
+               {"\xff\xc3", "\\xff\\xc3", "\\xff\\xc3"}};
+  for (const auto& c : cases) {
+    EXPECT_EQ(OneLine(c.text), c.line);
+    // A line end of two characters stays as it is.
+    EXPECT_EQ(Printable(c.text), c.lines);
+  }
+}
+
 TEST(Text, EditDistanceCountsInsertedDeletedAndReplacedBytes) {
   EXPECT_EQ(EditDistance("", "abc"), 3u);
   EXPECT_EQ(EditDistance("abc", ""), 3u);
