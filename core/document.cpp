@@ -144,7 +144,9 @@ void CYbSEDocument::RunEnginePrg2(int showsProgress, const char* /*text*/, int, 
 
 std::string CYbSEDocument::getResultFolder() const {
   if (UseCustomResultFolder && !CustomResultFolder.IsEmpty()) return CustomResultFolder.Absolute();
-  return ResolvedPath(fmt::format("{}_results", BaseNameOf(path_)), FolderOf(AbsoluteFromHere(path_)));
+  const std::string setupFolder(FolderOf(AbsoluteFromHere(path_)));
+  return ResolvedPath(fmt::format("{}_results", BaseNameOf(path_)),
+                      projectResultRoot_.IsEmpty() ? setupFolder : projectResultRoot_.Absolute());
 }
 
 }  // namespace tervane

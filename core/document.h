@@ -85,7 +85,8 @@ class CYbSEDocument {
   /// Non-zero while an engine runs this document.
   virtual int IsExecuting() const { return engineShell_ && engineShell_->IsExecuting() ? 1 : 0; }
 
-  /// The folder of the results: the custom folder when it is in use, else BASENAME_results beside the setup.
+  /// The folder of the results: the custom folder when it is in use, else BASENAME_results below the project's root, or
+  /// beside the setup where its file names no root.
   std::string getResultFolder() const;
   bool UseCustomResultFolder = false;
   FileName CustomResultFolder;
@@ -114,7 +115,7 @@ class CYbSEDocument {
   std::string path_;
   std::string error_;
   std::string header_;          ///< Comments in front of the first target.
-  FileName projectResultRoot_;  ///< As the file holds it, for other programs.
+  FileName projectResultRoot_;  ///< As the file holds it; other programs set it.
   LoadReport report_;
   std::vector<std::string> saveNotes_;
   bool modified_ = false;

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "core/host.h"
 
@@ -15,6 +16,18 @@ struct CYbSimpleLaunch {
   std::string Options;   ///< Separated by blanks; may be empty.
   std::string ExtraLog;  ///< A second log that the engine writes; may be empty.
   std::string Report;    ///< A file that the engine must leave; may be empty.
+
+  // What a shell may keep with a start. The document sets none of it.
+
+  static constexpr int UNABLE_TO_EXEC = -2048;  ///< The exit code of what could not be started.
+
+  std::string EMailAddress, SMSAddress;  ///< Who is told of the end.
+  int ExitCode = 0;
+  int ProcessId = 0;
+  int RefreshInterval = 0;  ///< Of the progress, in seconds.
+  int UseGPU = 0;           ///< The engine is to use graphics processors.
+  std::vector<int> GPUDevices;
+  int NoOfSubdomains = 1;
 };
 
 /// The program that has a document open, as the document asks it to run an engine.

@@ -57,6 +57,9 @@ class DeclaredKey {
     return AddFacts([&](KeyFacts& facts) { facts.least = least, facts.greatest = greatest; });
   }
   DeclaredKey& AtLeast(double least) { return Range(least, std::numeric_limits<double>::infinity()); }
+  DeclaredKey& Above(double least) {
+    return AddFacts([&](KeyFacts& facts) { facts.least = least, facts.isLeastOutside = true; });
+  }
   /// The member in which the node holds a value that is read and written through functions.
   DeclaredKey& HeldIn(const void* member) {
     if (member_) *member_ = member;

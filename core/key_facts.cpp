@@ -19,7 +19,8 @@ std::string_view TextOf(KeyChoices choices, int value) {
 
 std::string KeyFacts::RangeText() const {
   if (!HasRange()) return {};
-  if (!HasGreatest()) return fmt::format("{} or more", ShortestNumber(least));
+  if (!HasGreatest())
+    return fmt::format(fmt::runtime(isLeastOutside ? "above {}" : "{} or more"), ShortestNumber(least));
   if (least == -std::numeric_limits<double>::infinity()) return fmt::format("at most {}", ShortestNumber(greatest));
   return fmt::format("{} to {}", ShortestNumber(least), ShortestNumber(greatest));
 }
@@ -35,7 +36,8 @@ std::string WhyStray(const KeyFacts& facts, double value) {
   if (!std::isfinite(value)) return fmt::format("The value {} is no finite number.", value);
   // Limits are decimal numbers, values may have single precision.
   const double slack = 1e-6 * std::abs(value);
-  if (value < facts.least - slack || value > facts.greatest + slack)
+  const bool isTooSmall = facts.isLeastOutside ? value <= facts.least : value < facts.least - slack;
+  if (isTooSmall || value > facts.greatest + slack)
     return fmt::format("The value {} is outside its range: {}.", fmt::format("{:.7g}", value), facts.RangeText());
   if (facts.choices.empty()) return {};
   std::string texts;

@@ -30,10 +30,11 @@ struct KeyFacts {
   std::string_view label = {};  ///< What people call it where no page has a control for it.
   double least = -std::numeric_limits<double>::infinity();
   double greatest = std::numeric_limits<double>::infinity();
+  bool isLeastOutside = false;  ///< Values are above `least`, which is none of them.
 
   bool HasRange() const { return least > -std::numeric_limits<double>::infinity() || HasGreatest(); }
   bool HasGreatest() const { return greatest < std::numeric_limits<double>::infinity(); }
-  /// "0 to 1", "0 or more", "at most 1"; empty without a range.
+  /// "0 to 1", "0 or more", "above 0", "at most 1"; empty without a range.
   std::string RangeText() const;
   /// What is read behind a number: the fixed unit without brackets, or the abbreviation of the quantity's base unit;
   /// empty for neither.

@@ -228,6 +228,7 @@ struct KvfFile {
   KvfSection top;                    ///< Its children are the targets.
   KvfSyntaxError syntaxError;
   std::vector<KvfNote> notes;
+  int itemsWithoutSection = 0;  ///< What the counts of lists have asked for beyond the sections that there are.
 
   // Writing mode.
   std::vector<KvfSection*> open;  ///< The cursor: the open sections, outermost first; `top` is not among them.

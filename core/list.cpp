@@ -8,6 +8,36 @@
 
 namespace tervane {
 
+namespace {
+
+int SectionsIn(const KvfNode* node) {
+  const KvfSection* section = AsSection(node);
+  int count = 0;
+  for (const KvfNode* child = section ? section->firstChild : nullptr; child; child = child->next)
+    count += !child->IsKeyword();
+  return count;
+}
+
+}  // namespace
+
+int CountToTake(KvfNode* section, std::string_view key, int count, const KvfNode* items) {
+  if (count <= 0) {
+    if (count < 0) kvfAddNote(section, key, fmt::format("a count of {} reads as 0", count));
+    return 0;
+  }
+  const int sections = std::min(SectionsIn(items), kLargestItemCount);
+  int& spent = AsSection(section)->file->itemsWithoutSection;
+  const int spare = std::min({kMostItemsWithoutSection, kMostItemsWithoutSectionInFile - spent,  //
+                              kLargestItemCount - sections});
+  const int taken = std::min(count, sections + spare);
+  spent += std::max(taken - sections, 0);
+  if (taken < count)
+    kvfAddNote(
+        section, key,
+        fmt::format("a count of {} is cut to {}: the file has {} sections for the items", count, taken, sections));
+  return taken;
+}
+
 CYbSEKvfListBaseInterface::~CYbSEKvfListBaseInterface() {
   while (GetItemCount() > 0) children_.pop_back();
 }
@@ -91,10 +121,9 @@ void CYbSEKvfListBaseInterface::SetItemDefaults(int level, int force) {
 void CYbSEKvfListBaseInterface::ReadItemCount(KvfNode* section, std::string_view key) {
   int count = 0;
   if (!kvfGetParam(section, key, &count, 1, 1)) return;
-  if (count < 0) kvfAddNote(section, key, fmt::format("a count of {} reads as 0", count));
-  if (count > kLargestItemCount)
-    kvfAddNote(section, key, fmt::format("a count of {} is cut to {}", count, kLargestItemCount));
-  SetItemCount(std::clamp(count, 0, kLargestItemCount), 1);
+  // The count may stand in the section of the list or in that of its owner.
+  const KvfNode* own = GetSectionName().empty() ? nullptr : FindSection(section);
+  SetItemCount(CountToTake(section, key, count, own ? own : section), 1);
 }
 
 void CYbSEKvfListBaseInterface::Load(KvfNode* parentSection) {

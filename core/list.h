@@ -16,6 +16,14 @@ namespace tervane {
 
 /// Largest item count that a file may ask for.
 inline constexpr int kLargestItemCount = 1'000'000;
+/// How many items a count may ask for beyond the sections that the file has for them, and how many all counts of a file
+/// together: a small file cannot ask for much memory.
+inline constexpr int kMostItemsWithoutSection = 1'000;
+inline constexpr int kMostItemsWithoutSectionInFile = 100'000;
+
+/// An item count of a section as it is taken, where `items` holds the sections of the items. What differs from the
+/// count leaves a note.
+int CountToTake(KvfNode* section, std::string_view key, int count, const KvfNode* items);
 
 /// A list without its item class: what resizes and reorders any list.
 class CYbSEKvfListBaseInterface : public CYbSEKvfBase {
@@ -52,8 +60,7 @@ class CYbSEKvfListBaseInterface : public CYbSEKvfBase {
   void LoadSize(KvfNode* section) override { ReadItemCount(section, kItemCountKey); }
   void SaveSize(KvfFile* file) override { kvfPutParam(file, kItemCountKey, GetItemCount()); }
 
-  /// Resizes the list by a count key of the section, if it has that key. A negative count is 0, a count above a million
-  /// is cut to that; both leave a note.
+  /// Resizes the list by a count key of the section, if it has that key, as far as the count is taken.
   void ReadItemCount(KvfNode* section, std::string_view key);
 
   static constexpr std::string_view kItemCountKey = "YbSEKvfListItemCount";

@@ -18,6 +18,7 @@
 #include "core/kvf.h"
 #include "core/page_class.h"
 #include "core/path.h"
+#include "platform/key_number.h"
 
 namespace tervane {
 
@@ -330,7 +331,9 @@ struct DataArea {
   double x0 = 0, y0 = 0, x1 = 0, y1 = 0;
 
   bool IsUndefined() const { return x0 == 0.0 && y0 == 0.0 && x1 == 0.0 && y1 == 0.0; }
-  bool operator==(const DataArea&) const = default;
+  bool operator==(const DataArea& other) const {
+    return SameNumber(x0, other.x0) && SameNumber(y0, other.y0) && SameNumber(x1, other.x1) && SameNumber(y1, other.y1);
+  }
 };
 
 /// A root that knows the area that maps show.

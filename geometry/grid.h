@@ -11,6 +11,7 @@
 
 #include "platform/files.h"
 #include "platform/item_types.h"
+#include "platform/key_number.h"
 #include "platform/units.h"
 
 namespace tervane {
@@ -24,13 +25,16 @@ struct ZoneTable;
 struct Envelope {
   double xMin = 0, yMin = 0, xMax = 0, yMax = 0;
 
-  bool operator==(const Envelope&) const = default;
+  bool operator==(const Envelope& other) const {
+    return SameNumber(xMin, other.xMin) && SameNumber(yMin, other.yMin) && SameNumber(xMax, other.xMax) &&
+           SameNumber(yMax, other.yMax);
+  }
 };
 
 struct MapPoint {
   double x = 0, y = 0;
 
-  bool operator==(const MapPoint&) const = default;
+  bool operator==(const MapPoint& other) const { return SameNumber(x, other.x) && SameNumber(y, other.y); }
 };
 
 /// Where a grid stands: (x0, y0) is the lower left corner of cell (0, 0), i counts along the grid's x axis, j along its
@@ -47,7 +51,10 @@ struct GridGeometry {
   /// none), or empty.
   std::string Problem() const;
 
-  bool operator==(const GridGeometry&) const = default;
+  bool operator==(const GridGeometry& other) const {
+    return nx == other.nx && ny == other.ny && SameNumber(cellSize, other.cellSize) && SameNumber(x0, other.x0) &&
+           SameNumber(y0, other.y0) && SameNumber(rotation, other.rotation) && projection == other.projection;
+  }
 };
 
 inline constexpr std::size_t kMostCells = 400'000'000;

@@ -409,7 +409,7 @@ std::shared_ptr<const ShapeFacts> ShapeFactsOf(const std::string& path) {
 FileResult CheckShapeFile(const std::string& path, const ShapeRequest& request, const std::string& attribute) {
   const auto facts = ShapeFactsOf(path);
   if (!facts->error.empty()) return {facts->error, {}};
-  const bool isAttributeAsked = request.attribute.has_value();
+  const bool isAttributeAsked = request.needsAttribute || request.attribute.has_value();
   if (isAttributeAsked && !facts->tableProblem.empty()) return {facts->tableProblem, {}};
   const struct {
     bool isWanted;
@@ -438,6 +438,7 @@ FileResult CheckShapeFile(const std::string& path, const ShapeRequest& request, 
   const auto field = std::ranges::find_if(
       facts->fields, [&](const ShapeField& each) { return EqualIgnoringCase(each.name, attribute); });
   if (field == facts->fields.end()) return {WhyNoAttribute(path, facts->fields, attribute), {}};
+  if (!request.attribute) return {{}, facts->note};
   const bool isReal = *request.attribute == AttributeKind::Real && field->kind == AttributeKind::Whole;
   if (field->kind != *request.attribute && !isReal) {
     return {fmt::format("{}: attribute {} is {}, {} was expected", path, field->name, NameOf(field->kind),

@@ -53,7 +53,8 @@ struct Shape {
 /// What a file must be to be of use.
 struct ShapeRequest {
   bool points = false, lines = false, polygons = false;  ///< None set: any kind.
-  /// Of the selected attribute: any, whole numbers, or numbers (a whole number is a real one too).
+  bool needsAttribute = false;                           ///< One of the table's must be selected.
+  /// Of the selected attribute: any, whole numbers, or numbers (a whole number is a real one too). It is then needed.
   std::optional<AttributeKind> attribute;
 };
 

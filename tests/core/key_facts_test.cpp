@@ -19,7 +19,7 @@ constexpr KeyChoice kMethods[] = {{0, "Richards"}, {1, "Gravity"}, {3, "Hidden",
 
 TEST(KeyFacts, TellWhatIsWrongWithAValue) {
   const KeyFacts any, method{.choices = kMethods}, fraction{.least = 0, .greatest = 1}, count{.least = 1},
-      factor{.least = 0.01, .greatest = 0.99};
+      factor{.least = 0.01, .greatest = 0.99}, step{.least = 0, .isLeastOutside = true};
   const struct {
     const KeyFacts& facts;
     double value;
@@ -34,6 +34,8 @@ TEST(KeyFacts, TellWhatIsWrongWithAValue) {
       {fraction, 1, ""},
       {fraction, 1.25, "The value 1.25 is outside its range: 0 to 1."},
       {count, 0, "The value 0 is outside its range: 1 or more."},
+      {step, 1e-9, ""},
+      {step, 0, "The value 0 is outside its range: above 0."},
       // Limits of single precision are those that people write.
       {factor, static_cast<double>(0.99F), ""},
       {factor, static_cast<double>(0.01F), ""},

@@ -98,12 +98,54 @@ TEST(List, TheCountOfAFileDecidesAndItsFaultsLeaveNotes) {
   }
 }
 
-TEST(List, AnEnormousCountIsCutToAMillionAndItemsWithoutASectionAreNotMissing) {
+std::string Sections(int count) {
+  std::string sections;
+  for (int number = 1; number <= count; ++number) sections += "section Item_" + std::to_string(number) + " {} ";
+  return sections;
+}
+
+TEST(List, ACountAsksForFewItemsBeyondTheSectionsThatAreThere) {
+  const struct {
+    int count, sections, taken;
+    const char* note;
+  } cases[] = {
+      {1000, 0, 1000, "1000 of 1000 items"},
+      {2'000'000'000, 0, 1000, "YbSEKvfListItemCount: a count of 2000000000 is cut to 1000: the file has 0 sections"},
+      {1010, 10, 1010, "1000 of 1010 items"},
+      {1012, 11, 1011, "a count of 1012 is cut to 1011"},
+      {2100, 2100, 2100, nullptr},
+  };
+  for (const auto& c : cases) {
+    Root root;
+    auto* list = root.NewChild<Items>();
+    const auto notes = LoadText(
+        root, "section Items { YbSEKvfListItemCount = " + std::to_string(c.count) + "; " + Sections(c.sections) + "}");
+    EXPECT_EQ(list->GetItemCount(), c.taken) << c.count;
+    EXPECT_EQ(notes.empty(), !c.note);
+    if (!c.note) continue;
+    EXPECT_THAT(notes, testing::Contains(HasSubstr(c.note)));
+  }
+}
+
+TEST(List, AllCountsOfAFileTogetherAskForNoMoreThanMemoryHolds) {
+  Root root;
+  auto* table = root.NewChild<Table>("Table", "Table");
+  std::string rows;
+  for (int row = 1; row <= 300; ++row)
+    rows += "section Row_" + std::to_string(row) + " { YbSEKvfListItemCount = 1000000000; } ";
+  const auto notes = LoadText(root, "section Table { YbSEKvfListItemCount = 300; " + rows + "}");
+  int items = 0;
+  for (int row = 1; row <= 300; ++row) items += table->GetItem(row)->GetItemCount();
+  EXPECT_EQ(items, kMostItemsWithoutSectionInFile);
+  EXPECT_THAT(notes, testing::Contains("Table/Row_300:YbSEKvfListItemCount: a count of 1000000000 is cut to 0: the "
+                                       "file has 0 sections for the items"));
+}
+
+TEST(List, ItemsWithoutASectionOfTheirOwnAreNotMissing) {
   Root root;
   auto* list = root.NewChild<SectionlessItems>();
-  EXPECT_THAT(LoadText(root, "section List { Touched = 1; YbSEKvfListItemCount = 2147483647; }"),
-              ElementsAre("List:YbSEKvfListItemCount: a count of 2147483647 is cut to 1000000"));
-  EXPECT_EQ(list->GetItemCount(), 1'000'000);
+  EXPECT_THAT(LoadText(root, "section List { Touched = 1; YbSEKvfListItemCount = 30; }"), IsEmpty());
+  EXPECT_EQ(list->GetItemCount(), 30);
 }
 
 // ---- Items
