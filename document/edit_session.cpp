@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <new>
 
 #include <fmt/format.h>
 
@@ -51,9 +52,15 @@ std::unique_ptr<EditSession> EditSession::New(std::string recoveryFolder) {
 std::unique_ptr<EditSession> EditSession::Open(const std::string& path, std::string recoveryFolder,
                                                std::string& error) {
   std::unique_ptr<EditSession> session(new EditSession(std::move(recoveryFolder)));
-  if (!session->Load(path, error)) return nullptr;
-  session->TakeLock();
-  session->Begin();
+  // Before it is read, so that no change of another program comes between.
+  session->TakeLock(path);
+  try {
+    if (!session->Load(path, error)) return nullptr;
+    session->Begin();
+  } catch (const std::bad_alloc&) {
+    error = fmt::format("{}: there is not enough memory for this setup", path);
+    return nullptr;
+  }
   return session;
 }
 
@@ -78,7 +85,7 @@ std::unique_ptr<EditSession> EditSession::Recover(const Recovery& recovery, std:
     document.Continue(*original.document_);
     session->known_ = original.known_;
     if (content.basedOn != original.known_.hash) session->known_ = {std::nullopt, content.basedOn};
-    session->TakeLock();
+    session->TakeLock(recovery.setup);
   } else {
     session->formerPath_ = recovery.setup;
     document.BecomeNew();
@@ -109,11 +116,11 @@ bool EditSession::Load(const std::string& path, std::string& error) {
   return true;
 }
 
-void EditSession::TakeLock() {
+void EditSession::TakeLock(const std::string& path) {
   std::error_code error;
-  if (!os::MayWrite(Path(), error)) {
+  if (!os::MayWrite(path, error)) {
     readOnlyReason_ = fmt::format("it is write-protected: {}", error.message());
-  } else if (lock_.Take(Path()) != SetupLock::Outcome::Taken) {
+  } else if (lock_.Take(path) != SetupLock::Outcome::Taken) {
     readOnlyReason_ = lock_.Reason();
   }
 }

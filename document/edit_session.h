@@ -89,7 +89,7 @@ class EditSession {
   /// Reads the setup and what is known of its file.
   bool Load(const std::string& path, std::string& error);
   /// Takes the lock of the setup, or finds why it cannot be written.
-  void TakeLock();
+  void TakeLock(const std::string& path);
   /// Ends what loading began.
   void Begin();
   void ValidateAllAndNotify();

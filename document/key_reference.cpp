@@ -54,7 +54,7 @@ std::string KeyReference::PathOfKind(std::string_view sectionPath) const {
   return path;
 }
 
-const KeyInfo* KeyReference::Find(std::string_view sectionPath, std::string_view key) const {
+const KeyInfo* KeyReference::KeyOf(std::string_view sectionPath, std::string_view key) const {
   auto found = byPath_.find(std::string(sectionPath));
   if (found == byPath_.end()) found = byPath_.find(PathOfKind(sectionPath));
   if (found == byPath_.end()) return nullptr;
@@ -64,13 +64,13 @@ const KeyInfo* KeyReference::Find(std::string_view sectionPath, std::string_view
 }
 
 std::string_view KeyReference::DefaultOf(std::string_view sectionPath, std::string_view key) const {
-  const KeyInfo* const info = Find(sectionPath, key);
+  const KeyInfo* const info = KeyOf(sectionPath, key);
   return info ? std::string_view(info->defaultValue) : std::string_view();
 }
 
 std::string_view KeyReference::MeaningOf(std::string_view sectionPath, std::string_view key,
                                          std::string_view value) const {
-  const KeyInfo* const info = Find(sectionPath, key);
+  const KeyInfo* const info = KeyOf(sectionPath, key);
   if (!info) return {};
   if (info->facts.choices.empty()) return info->facts.UnitText();
   int number = 0;

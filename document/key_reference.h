@@ -29,6 +29,8 @@ class KeyReference {
   /// The default of a key as the file holds it; empty when the key is unknown or has none. The path is that of a
   /// section in a file, with the items' numbers.
   std::string_view DefaultOf(std::string_view sectionPath, std::string_view key) const;
+  /// What is known of a key; null when nothing is. The path is as above.
+  const KeyInfo* KeyOf(std::string_view sectionPath, std::string_view key) const;
   /// What a value in a file means, for people: the text of the choice, or the unit of the number; empty when nothing is
   /// known of it.
   std::string_view MeaningOf(std::string_view sectionPath, std::string_view key, std::string_view value) const;
@@ -36,7 +38,6 @@ class KeyReference {
  private:
   /// The path of the kind of a section: "A/Item_12/B#2" gives "A/Item_%d/B".
   std::string PathOfKind(std::string_view sectionPath) const;
-  const KeyInfo* Find(std::string_view sectionPath, std::string_view key) const;
 
   std::vector<KeySection> sections_;
   std::unordered_map<std::string, std::size_t> byPath_;

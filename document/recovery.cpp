@@ -99,7 +99,7 @@ FileResult WriteAutosave(const std::string& path, const AutosaveContent& content
   // The setup may be one that others must not read: an atomic write keeps the access rights of what stands there.
   std::error_code error, ignored;
   const bool isNew = os::File::CreateNew(path, os::File::Access::OwnerOnly, error).IsOpen();
-  FileResult result = WriteFileAtomically(path, text);
+  FileResult result = WriteOwnFileAtomically(path, text);
   if (isNew && !result.Ok()) fs::remove(NativePath(path), ignored);
   return result;
 }
@@ -122,6 +122,7 @@ std::string NewAutosaveName(const std::string& setup, const std::string& recover
 }
 
 bool MayReplaceAutosave(const std::string& path, const std::string& setup) {
+  if (!WhyNoOwnFile(path).empty()) return false;
   if (!FileExists(path)) return true;
   FileContent file;
   // A crash between making it and filling it.

@@ -21,6 +21,9 @@ namespace {
 
 /// More than any lock holds.
 constexpr std::size_t kMostBytes = 4096;
+constexpr std::string_view kOneChange = "one change";
+/// How long one change of another process is waited for.
+constexpr std::chrono::seconds kPatience{10};
 
 std::string LockFileOf(const std::string& setup) {
   const std::string real = RealPath(setup);
@@ -47,7 +50,7 @@ Lock ReadLock(const std::string& path) {
   Lock lock;
   lock.holder.file = path;
   std::error_code error;
-  lock.file = os::File::OpenForReading(path, error);
+  lock.file = os::File::OpenForReading(path, error, os::File::Links::Refuse);
   if (error == std::errc::no_such_file_or_directory || error == std::errc::not_a_directory) return lock;
   lock.state = Lock::State::Held;
   if (!error) lock.status = lock.file.GetStatus(error);
@@ -67,35 +70,12 @@ Lock ReadLock(const std::string& path) {
     lock.state = Lock::State::Stale;
   } else if (lock.content.size() <= kMostBytes && !FirstInvalidUtf8(lock.content)) {
     lock.holder.process = ProcessOfLines(lock.content);
+    lock.holder.isForOneChange = NamedValue(lock.content, "for") == kOneChange;
     if (lock.holder.process && !lock.holder.process->MayRun()) lock.state = Lock::State::Stale;
   }
   if (lock.state == Lock::State::Held && !lock.holder.process && lock.holder.whyUnknown.empty())
     lock.holder.whyUnknown = "it does not tell whose it is";
   return lock;
-}
-
-/// Makes a new file that has its content from the first moment, where the file system can do that.
-void CreateWhole(const std::string& path, const std::string& content, std::error_code& error) {
-  static std::atomic<unsigned> counter{0};
-  const std::string temporary = fmt::format("{}.{}-{}", path, os::ProcessId(), ++counter);
-  const auto write = [&](const std::string& to) {
-    os::File file = os::File::CreateNew(to, os::File::Access::AsMaskAllows, error);
-    if (error) return;
-    file.WriteAll(content, error);
-    if (!error) file.Flush(error);
-    std::error_code closeError;
-    file.Close(closeError);
-    std::error_code ignored;
-    if (error) std::filesystem::remove(NativePath(to), ignored);
-  };
-  write(temporary);
-  if (error) return;
-  os::RenameToNew(temporary, path, error);
-  if (!error) return;
-  std::error_code ignored;
-  std::filesystem::remove(NativePath(temporary), ignored);
-  // Some shared folders know no renaming that spares what stands there.
-  if (error != std::errc::file_exists) write(path);
 }
 
 /// Removes a stale lock. Two processes that find the same one are kept apart by locking the file itself: the second
@@ -117,9 +97,10 @@ std::string HolderSentence(const LockHolder& holder) {
                        holder.file, holder.whyUnknown);
   const RunningProcess& process = *holder.process;
   if (process.IsThis()) return "it is open in another window already";
-  std::string sentence = fmt::format("{} has it open on host {} (process {})",
-                                     process.user.empty() ? "somebody" : process.user, process.host, process.process);
-  if (!process.IsOnThisHost()) sentence += fmt::format("; remove {} when that editor runs no more", holder.file);
+  std::string sentence =
+      fmt::format("{} {} on host {} (process {})", process.user.empty() ? "somebody" : process.user,
+                  holder.isForOneChange ? "is changing it" : "has it open", process.host, process.process);
+  if (!process.IsOnThisHost()) sentence += fmt::format("; remove {} when that process runs no more", holder.file);
   return sentence;
 }
 
@@ -136,18 +117,25 @@ SetupLock& SetupLock::operator=(SetupLock&& other) noexcept {
   return *this;
 }
 
-SetupLock::Outcome SetupLock::Take(const std::string& setup) {
+SetupLock::Outcome SetupLock::Take(const std::string& setup, Purpose purpose) {
   Release();
   reason_.clear();
   static std::atomic<unsigned> counter{0};
   const std::string path = LockFileOf(setup);
   // The number tells one lock of this process from another.
-  const std::string content = ProcessLines(RunningProcess::This()) + NamedLine("session", std::to_string(++counter));
+  std::string content = ProcessLines(RunningProcess::This()) + NamedLine("session", std::to_string(++counter));
+  if (purpose == Purpose::OneChange) content += NamedLine("for", std::string(kOneChange));
+  const auto end = std::chrono::steady_clock::now() + kPatience;
   // Again and again only while others take over the same stale lock at this moment.
   constexpr int kAttempts = 200;
   std::error_code error;
   for (int i = 0; i < kAttempts; ++i) {
     Lock lock = ReadLock(path);
+    while (lock.state == Lock::State::Held && lock.holder.isForOneChange && std::chrono::steady_clock::now() < end) {
+      std::this_thread::sleep_for(std::chrono::milliseconds(2));
+      lock = ReadLock(path);
+      i = 0;
+    }
     if (lock.state == Lock::State::Held) {
       reason_ = HolderSentence(lock.holder);
       return Outcome::Held;
@@ -156,7 +144,7 @@ SetupLock::Outcome SetupLock::Take(const std::string& setup) {
       if (i > 0) std::this_thread::sleep_for(std::chrono::milliseconds(1));
       RemoveStale(std::move(lock));
     }
-    CreateWhole(path, content, error);
+    CreateWholeFile(path, content, error);
     if (!error) {
       if (ReadLock(path).content != content) continue;
       file_ = path;

@@ -16,6 +16,7 @@ struct LockHolder {
   std::string file;                       ///< The lock.
   std::optional<RunningProcess> process;  ///< Nothing where the lock does not tell: then `whyUnknown` does.
   std::string whyUnknown;
+  bool isForOneChange = false;  ///< It reads, changes and writes the setup, and is done.
 };
 
 /// The same as a sentence: "anna has it open on host gauss (process 4711)", with what to do where that editor cannot be
@@ -37,8 +38,11 @@ class SetupLock {
   ~SetupLock() { Release(); }
 
   enum class Outcome { Taken, Held, CannotWrite };
-  /// Takes the lock of a setup, which need not exist. A second one of this process is refused like any other.
-  Outcome Take(const std::string& setup);
+  /// What for: to have the setup open, or to read, change and write it, which is soon done.
+  enum class Purpose { Editing, OneChange };
+  /// Takes the lock of a setup, which need not exist. A second one of this process is refused like any other; a holder
+  /// that makes one change is waited for.
+  Outcome Take(const std::string& setup, Purpose purpose = Purpose::Editing);
   /// Why it was not taken, as a sentence for the user.
   const std::string& Reason() const { return reason_; }
   bool IsTaken() const { return !file_.empty(); }

@@ -36,6 +36,8 @@ std::string LogBeside(const std::string& statePath) {
 
 /// An empty log. The old one is another file, so that its present readers are not confused.
 std::string MakeLog(const std::string& path) {
+  if (const std::string why = WhyNoOwnFile(path); !why.empty())
+    return fmt::format("the log {} cannot be written: {}", path, why);
   std::error_code error;
   std::filesystem::remove(NativePath(path), error);
   os::File::CreateNew(path, os::File::Access::AsMaskAllows, error);

@@ -3,6 +3,7 @@
 #include "execution/run_state.h"
 
 #include <charconv>
+#include <filesystem>
 #include <thread>
 
 #include <fmt/format.h>
@@ -120,6 +121,10 @@ std::optional<RunState> ReadRunState(const std::string& path, std::string& probl
 HeldRunState::Outcome HeldRunState::Hold(const std::string& path, std::chrono::milliseconds patience,
                                          std::string& problem) {
   path_ = path;
+  if (const std::string why = WhyNoOwnFile(path); !why.empty()) {
+    problem = fmt::format("cannot write {}: {}; remove it, and run the setup again", path, why);
+    return Outcome::CannotWrite;
+  }
   std::error_code error;
   file_ = os::File::OpenOrCreate(path, error);
   if (error) {
@@ -128,6 +133,7 @@ HeldRunState::Outcome HeldRunState::Hold(const std::string& path, std::chrono::m
   }
   std::string begin(kFirstLine.size(), '\0');
   begin.resize(file_.Read(begin.data(), begin.size(), error));
+  isEmpty_ = begin.empty();
   // What a power cut left of a state may be empty or of zeros.
   if (begin != kFirstLine && begin.find_first_not_of('\0') != std::string::npos) {
     problem = fmt::format("{} is none of the files that a run keeps: rename it, and run the setup again", path);
@@ -154,8 +160,15 @@ bool HeldRunState::Write(const RunState& state, std::string& problem) {
   file_.Seek(0, error);
   if (!error) file_.WriteAll(text, error);
   if (!error) file_.Flush(error);
-  if (error) problem = fmt::format("cannot write {}: {}", path_, error.message());
-  return !error;
+  if (!error) {
+    isEmpty_ = false;
+    return true;
+  }
+  problem = fmt::format("cannot write {}: {}", path_, error.message());
+  // What holds no state of an earlier run, and now no whole one, would tell nobody anything.
+  std::error_code ignored;
+  if (isEmpty_) std::filesystem::remove(NativePath(path_), ignored);
+  return false;
 }
 
 // ---- Outcomes

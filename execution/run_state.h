@@ -65,12 +65,13 @@ class HeldRunState {
   Outcome Hold(const std::string& path, std::chrono::milliseconds patience, std::string& problem);
   /// What stands there; nothing in a new file, and in one that cannot be understood.
   std::optional<RunState> Read();
-  /// False with the problem when it could not be written.
+  /// False with the problem when it could not be written; a file that held nothing before is then removed.
   bool Write(const RunState& state, std::string& problem);
 
  private:
   std::string path_;
   os::File file_;
+  bool isEmpty_ = false;  ///< Nothing has been written yet.
 };
 
 /// How a run ended, or that it goes on.

@@ -162,6 +162,21 @@ TEST_F(FlowModelDocument, KeepsTheCustomResultFolderInTheFile) {
   ASSERT_TRUE(withRoot.OpenText(SetupText(14, "") + root, path));
   EXPECT_THAT(SavedText(withRoot), testing::EndsWith(root));
 
+  // What engines ask finds the same folder.
+  for (const char* settings : {"", "ProjectResultRoot = file \"runs\"\n",
+                               "ProjectResultRoot = file \"runs\"\nUseCustomResultFolder = 0\n"
+                               "CustomResultFolder = file \"own\"\n",
+                               "UseCustomResultFolder = 1\nCustomResultFolder = file \"own\"\n"}) {
+    folder.Write("a.tvd", SetupText(14, "Flow = file \"flow.nds2\"") + "target SYSTEM {\n" + settings + "}\n");
+    CFlowModelDoc opened;
+    ASSERT_TRUE(opened.OnOpenDocument(path)) << opened.Error();
+    KvfFile* file = kvfLoadFile(path, 0);
+    char asked[kKvfPathBuffer] = {};
+    kvfGetResultFolderPath(kvfParamByNum(kvfKeywordByNum(kvfTargetByNum(file, 1), 1), 1), asked);
+    kvfClose(&file);
+    EXPECT_EQ(opened.getResultFolder(), asked) << settings;
+  }
+
   reopened.UseCustomResultFolder = false;
   EXPECT_EQ(reopened.getResultFolder(), folder.Path() + "/a_results");
 }

@@ -106,6 +106,15 @@ TEST_F(RecoveryTest, ACopyThatAnotherProgramMadeIsLeftAlone) {
   EXPECT_TRUE(MayReplaceAutosave(path, setup));
 }
 
+TEST_F(RecoveryTest, ALinkInItsPlaceIsNotWrittenThrough) {
+  const std::string elsewhere = folder.Write("elsewhere", ""), path = folder.File("a.tvd~");
+  std::filesystem::create_symlink(elsewhere, path);
+  EXPECT_FALSE(MayReplaceAutosave(path, setup));
+  EXPECT_THAT(WriteAutosave(path, {setup, "", RunningProcess::This(), "text"}).error,
+              testing::HasSubstr("it is a symbolic link"));
+  EXPECT_EQ(test::ReadFile(elsewhere), "");
+}
+
 TEST_F(RecoveryTest, TheFolderIsSearchedAndTheNewestComesFirst) {
   EXPECT_TRUE(FindRecoveries(folder.File("missing")).empty());
   const std::string names[] = {NewAutosaveName("", kept), NewAutosaveName(setup, kept), AutosaveBeside(setup)};

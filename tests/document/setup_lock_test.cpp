@@ -127,6 +127,28 @@ TEST_F(Lock, RemovedByHandItBelongsToWhoTakesItNext) {
   EXPECT_TRUE(HolderOf(setup));
 }
 
+TEST_F(Lock, OfOneChangeIsWaitedFor) {
+  SetupLock first, second, third;
+  ASSERT_EQ(first.Take(setup, SetupLock::Purpose::OneChange), Outcome::Taken);
+  EXPECT_TRUE(HolderOf(setup)->isForOneChange);
+  std::thread change([&] {
+    std::this_thread::sleep_for(std::chrono::milliseconds(50));
+    first.Release();
+  });
+  EXPECT_EQ(second.Take(setup), Outcome::Taken) << second.Reason();
+  change.join();
+  EXPECT_EQ(third.Take(setup, SetupLock::Purpose::OneChange), Outcome::Held);  // An editor is not.
+}
+
+TEST_F(Lock, IsNotLookedForBehindALink) {
+  const std::string elsewhere = folder.Write("elsewhere", "");
+  fs::create_symlink(elsewhere, file);
+  SetupLock lock;
+  EXPECT_EQ(lock.Take(setup), Outcome::Held);
+  EXPECT_THAT(lock.Reason(), HasSubstr(".a.tvd.lock cannot be understood"));
+  EXPECT_TRUE(fs::is_symlink(file));
+}
+
 TEST_F(Lock, TellsWhyItCannotBeWritten) {
   folder.Write("file", "");
   for (const char* name : {"missing/a.tvd", "file/a.tvd"}) {

@@ -4,10 +4,13 @@
 
 #include <chrono>
 #include <csignal>
+#include <filesystem>
 #include <functional>
 #include <thread>
 
 #include <gmock/gmock.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
 
 #include "execution/run_follower.h"
 #include "platform/files.h"
@@ -201,6 +204,50 @@ TEST_F(Running, AFileOfTheUsersUnderTheNameOfTheStateStays) {
   EXPECT_FALSE(run.Start(Request(test::WriteEngine(folder, "Engine", "true")), problem));
   EXPECT_THAT(problem, HasSubstr("karup_Run.txt is none of the files that a run keeps"));
   EXPECT_EQ(ReadFile(own), "notes of mine");
+}
+
+TEST_F(Running, WhatIsNoRegularFileUnderTheNamesOfARunIsNeitherWrittenNorWaitedFor) {
+  const std::string engine = test::WriteEngine(folder, "Engine", "echo words");
+  const std::string elsewhere = folder.Write("elsewhere", "");
+  const struct {
+    const char* name;
+    bool isLink;
+    const char* problem;
+  } cases[] = {{"karup_Run.txt", false, "karup_Run.txt: it is not a regular file"},
+               {"karup_Run.txt", true, "karup_Run.txt: it is a symbolic link"},
+               {"karup_Run.log", false, "karup_Run.log cannot be written: it is not a regular file"},
+               {"karup_Run.log", true, "karup_Run.log cannot be written: it is a symbolic link"}};
+  for (const auto& c : cases) {
+    const std::string path = folder.File(std::string("basin/results/") + c.name);
+    std::filesystem::create_directories(folder.File("basin/results"));
+    if (c.isLink)
+      std::filesystem::create_symlink(elsewhere, path);
+    else
+      ASSERT_EQ(mkfifo(path.c_str(), 0600), 0);
+    SetupRun run;
+    std::string problem;
+    if (run.Start(Request(engine), problem)) problem = Ended(run);
+    EXPECT_THAT(problem, HasSubstr(c.problem));
+    EXPECT_EQ(ReadFile(elsewhere), "");
+    EXPECT_FALSE(std::filesystem::is_regular_file(std::filesystem::symlink_status(path)));
+    std::filesystem::remove_all(folder.File("basin/results"));
+  }
+}
+
+TEST_F(Running, AFullDiskLeavesNoEmptyState) {
+  const rlimit limit{1024, RLIM_INFINITY};
+  rlimit before;
+  os::PrepareProcess();
+  getrlimit(RLIMIT_FSIZE, &before);
+  const std::string engine = test::WriteEngine(folder, "Engine", "true");
+  setrlimit(RLIMIT_FSIZE, &limit);
+  SetupRun run;
+  std::string problem;
+  EXPECT_FALSE(run.Start(Request(engine), problem));
+  setrlimit(RLIMIT_FSIZE, &before);
+  EXPECT_THAT(problem, HasSubstr("cannot write"));
+  EXPECT_FALSE(FileExists(folder.File("basin/results/karup_Run.txt")));
+  Ended(run = Started(Request(engine)));
 }
 
 TEST_F(Running, AStateThatIsNotWholeIsNoState) {
