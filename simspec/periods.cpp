@@ -4,6 +4,8 @@
 
 #include <cmath>
 
+#include <fmt/format.h>
+
 namespace tervane {
 
 // ---- CSimPeriodKvf
@@ -13,6 +15,20 @@ CYbDateTime CSimPeriodKvf::GetSimStartDate() const {
     if (const CYbDateTime hotStart = CYbDateTime::Parse(HotStartDate, kHotStartFormat); hotStart.IsValid())
       return hotStart;
   return SIMSTART;
+}
+
+int CSimPeriodKvf::ValidateData() {
+  const CYbDateTime start = GetSimStartDate();
+  if (!start.IsValid() || !SIMEND.IsValid()) {
+    AddError("The simulation period has a date that is none", SIMEND.IsValid() ? "SIMSTART" : "SIMEND");
+    return 0;
+  }
+  if (SIMEND == start) AddWarning("The simulation ends when it begins", "SIMEND");
+  if (SIMEND >= start) return 1;
+  AddError(
+      "The simulation ends before it begins", "SIMEND",
+      fmt::format("it begins at {} and ends at {}", start.Format("%Y-%m-%d %H:%M"), SIMEND.Format("%Y-%m-%d %H:%M")));
+  return 0;
 }
 
 void CSimPeriodKvf::ExchangeKeys(KeyExchange& keys) {

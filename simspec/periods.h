@@ -34,6 +34,9 @@ class CSimPeriodKvf : public CTvnKvfBase {
   /// Fills the list of hot start dates from a result catalogue; 1 when the list was built.
   int LoadHotStartDates(const std::string& path);
 
+  /// A simulation that ends before it begins is none.
+  int ValidateData() override;
+
   /// How the text of the hot start date begins.
   static constexpr std::string_view kHotStartFormat = "%Y/%m/%d %H:%M";
 

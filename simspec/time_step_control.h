@@ -22,6 +22,8 @@ class CCompControlParaTimeStepKvf : public CTvnKvfBase {
   float MaxInfiltDepthPerTimeStep = 10;
   float PrecThresholdRate = 0.1f;  ///< Precipitation rate that requires its own time step.
 
+  int ValidateData() override;
+
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 };

@@ -32,6 +32,10 @@ constexpr std::size_t kMostYears = 500;
 
 using GridData = CTvn2DOrthoRotatedGridData;
 
+bool HasError(const std::vector<Finding>& findings) {
+  return std::ranges::any_of(findings, [](const Finding& finding) { return finding.severity == Severity::Error; });
+}
+
 CYbDateTime DateAt(std::int64_t seconds) { return CYbDateTime::FromSecondsSinceEpoch(seconds); }
 
 /// A step of a file of grids, as a mean over the domain.
@@ -263,7 +267,7 @@ void CoverageBuilder::ReadPoints(CoverageRow& row) {
 }
 
 void CoverageBuilder::LookForCells(CoverageRow& row) {
-  if (!row.file.values || !board_.domain || board_.domainCells == 0) return;
+  if (!row.file.values || !board_.domain || board_.domainCells == 0 || HasError(row.file.findings)) return;
   const GridSource& source = *row.file.values;
   const auto facts = source.type == CData2DKvf::kGridFile ? DataFileFactsOf(source.file) : nullptr;
   const DataItem* item = facts ? facts->Item(source.item) : nullptr;
@@ -308,9 +312,7 @@ void CoverageBuilder::Conclude(CoverageRow& row) {
     row.remarks.push_back({severity, std::move(text), {}, {}});
   };
   row.remarks = row.file.findings;
-  const bool isTold =
-      std::ranges::any_of(row.remarks, [](const Finding& finding) { return finding.severity == Severity::Error; });
-  if (!row.problem.empty() && !isTold) add(Severity::Error, row.problem);
+  if (!row.problem.empty() && !HasError(row.remarks)) add(Severity::Error, row.problem);
   // Nodes of points have no validation.
   if (row.problem.empty() && row.file.use.kind == FileUse::Kind::Points && board_.request.domain.geometry)
     std::ranges::move(FindMisplacement(LocateFile(row.file.use), *board_.request.domain.geometry),

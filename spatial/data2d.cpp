@@ -142,6 +142,10 @@ std::string CData2DKvf::GetNdsItemName() const {
   return ItemNameOf(gridFile_->File.Absolute(), gridFile_->SelectedItem());
 }
 
+std::string CData2DKvf::WhyFileNotValid() const {
+  return Type == kGridFile ? gridFile_->WhyNotValid() : Type == kShapeFile ? shapeFile_->WhyNotValid() : std::string();
+}
+
 GridSource CData2DKvf::CurrentSource() const {
   GridSource source;
   source.type = Type;
@@ -167,7 +171,8 @@ std::shared_ptr<CTvn2DOrthoRotatedGridData> CData2DKvf::CreateGridData(std::stri
   const GridSource source = CurrentSource();
   if (source.type == kUniform) return nullptr;
   auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
-  const FileResult result = BuildGrid(source, {}, *grid);
+  FileResult result{WhyFileNotValid(), {}};
+  if (result.Ok()) result = BuildGrid(source, {}, *grid);
   if (problem) *problem = result.error;
   if (!result.Ok()) return nullptr;
   if (source.type == kShapeFile) grid->SetItemName(GetTitle());
@@ -177,6 +182,10 @@ std::shared_ptr<CTvn2DOrthoRotatedGridData> CData2DKvf::CreateGridData(std::stri
 std::shared_ptr<ComputedGrid> CData2DKvf::GridComputation() {
   GridSource source = CurrentSource();
   if (source.type == kUniform) return nullptr;
+  if (!WhyFileNotValid().empty()) {
+    kept_.reset();
+    return nullptr;
+  }
   if (!kept_ || !(kept_->source == source)) {
     const char* const verb = source.type == kGridFile ? "Reading" : IsCode() ? "Computing codes of" : "Interpolating";
     const std::string name = source.type == kShapeFile ? GetTitle() : std::string();
@@ -193,6 +202,7 @@ std::shared_ptr<ComputedGrid> CData2DKvf::GridComputation() {
 
 std::shared_ptr<const CTvn2DOrthoRotatedGridData> CData2DKvf::GetGridData(std::string* problem) {
   const auto grid = GridComputation();
+  if (problem) *problem = WhyFileNotValid();
   if (!grid) return nullptr;
   grid->Run();
   if (problem) *problem = grid->Problem();
@@ -201,6 +211,10 @@ std::shared_ptr<const CTvn2DOrthoRotatedGridData> CData2DKvf::GetGridData(std::s
 
 std::shared_ptr<Computed<CTvnShapeData>> CData2DKvf::ShapeComputation() {
   if (Type != kShapeFile && Type != kXyzFile) return nullptr;
+  if (!WhyFileNotValid().empty()) {
+    keptShapes_.reset();
+    return nullptr;
+  }
   GridSource source = CurrentSource();
   if (!keptShapes_ || !(keptShapes_->source == source)) {
     auto made = std::make_shared<Computed<CTvnShapeData>>(
@@ -216,6 +230,7 @@ std::shared_ptr<Computed<CTvnShapeData>> CData2DKvf::ShapeComputation() {
 
 std::shared_ptr<const CYbShapeData> CData2DKvf::GetShapeData(std::string* problem) {
   const auto shapes = ShapeComputation();
+  if (problem) *problem = WhyFileNotValid();
   if (!shapes) return nullptr;
   shapes->Run();
   if (problem) *problem = shapes->Problem();

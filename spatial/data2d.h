@@ -71,16 +71,19 @@ class CData2DKvf : public CTvnKvfBase, public CellValues {
   /// The name of the selected item of the grid file; empty when it cannot be read.
   std::string GetNdsItemName() const;
 
+  /// Why the file in use cannot be used; empty for a valid one, for a text of points and for a uniform value.
+  std::string WhyFileNotValid() const;
+
   GridSource CurrentSource() const override;
-  /// The building of the grid: another one when what decides the grid has changed; null for a uniform value. It asks no
-  /// node.
+  /// The building of the grid: another one when what decides the grid has changed; null for a uniform value and for a
+  /// file that is not valid. It asks no node.
   std::shared_ptr<ComputedGrid> GridComputation() override;
   /// The grid, built here and now if it is not there yet; null for a uniform value and where it cannot be built, and
   /// then `problem` says why.
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> GetGridData(std::string* problem = nullptr);
   /// A new grid; the one that is kept is left alone.
   std::shared_ptr<CTvn2DOrthoRotatedGridData> CreateGridData(std::string* problem = nullptr) const;
-  /// The same of shapes or points as they are in their file; null for other sources.
+  /// The same of shapes or points as they are in their file; null for other sources and for a file that is not valid.
   std::shared_ptr<Computed<CTvnShapeData>> ShapeComputation();
   std::shared_ptr<const CYbShapeData> GetShapeData(std::string* problem = nullptr);
   /// With 0 the next call builds anew.

@@ -14,6 +14,7 @@
 #include "data/grid_files.h"
 #include "geometry/grid.h"
 #include "platform/files.h"
+#include "platform/key_number.h"
 
 namespace tervane {
 
@@ -49,7 +50,7 @@ struct GridSource {
   int item = 1;
   std::string attribute;
   int interpMethod = 0;
-  float searchRadius = 0;
+  KeyNumber<float> searchRadius = 0;
   int axisUnit = 0, itemUnit = 0, itemType = 0;
   GridGeometry geometry;
   std::string gapFill;  ///< The value of an attribute that cells outside all polygons get; empty for none.
@@ -79,7 +80,7 @@ struct ForcingLine {
 struct ForcingSeries {
   std::string name;  ///< Of the station; empty where there is only one.
   std::string id;    ///< The station's code in the grid of areas, or the value of its polygons.
-  std::optional<double> constant;
+  std::optional<KeyNumber<double>> constant;
   std::optional<std::vector<ForcingLine>> lines = {};
   std::string problem = {};  ///< Why nothing is known of it; empty where it is.
   std::string path;

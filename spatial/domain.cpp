@@ -20,6 +20,17 @@ namespace {
 constexpr KeyChoice kSources[] = {{CCatchmentKvf::kGridFile, "Catchment defined by Nds File"},
                                   {CCatchmentKvf::kShapeFile, "Catchment defined by Shape File"}};
 
+/// The key of what keeps the grid from being made.
+const char* KeyOfProblem(const GridGeometry& grid) {
+  if (grid.nx <= 0) return "nxShp";
+  if (grid.ny <= 0) return "nyShp";
+  if (grid.CellCount() > kMostCells) return "nxShp";
+  if (!(grid.cellSize > 0) || !std::isfinite(grid.cellSize)) return "sizeShp";
+  if (!std::isfinite(grid.x0)) return "x0Shp";
+  if (!std::isfinite(grid.y0)) return "y0Shp";
+  return std::isfinite(grid.rotation) ? "sizeShp" : "rotationShp";
+}
+
 }  // namespace
 
 CCatchmentKvf::CCatchmentKvf(CYbSEKvfBase* parent)
@@ -32,6 +43,7 @@ CCatchmentKvf::CCatchmentKvf(CYbSEKvfBase* parent)
   gridFile_->SetDomainCheck(0);
   shapeFile_->SetAxisUnit(ShapeAxisUnit);
   shapeFile_->SetPolygonShape(1);
+  shapeFile_->NeedNoAttribute();
   gridFile_->UsedWhen(Is(Type, kGridFile));
   shapeFile_->UsedWhen(Is(Type, kShapeFile));
 }
@@ -152,7 +164,8 @@ int CCatchmentKvf::ValidateData() {
   if (auto* maps = Important(kDomainFollower)) maps->AdoptDomain(GetEnvelope());
   const GridGeometry geometry = GetModelGeometry();
   if (const std::string problem = geometry.Problem(); !problem.empty())
-    AddWarning("The grid of the model cannot be made", Type == kShapeFile ? "nxShp" : "FILE_NAME", problem);
+    AddWarning("The grid of the model cannot be made", Type == kShapeFile ? KeyOfProblem(geometry) : "FILE_NAME",
+               problem);
   const std::string& projection = geometry.projection;
   if (CYbMapProjection(projection).IsGeographical()) {
     AddError(projection + " is not supported by Tervane. Only projected coordinate systems are allowed", "MapProjShp");

@@ -124,7 +124,8 @@ int CGeoDataBoundCondCatchmentData::GetBoundaryIndex(GridCell cell) const {
 std::vector<std::size_t> CGeoDataBoundCondCatchmentData::BoundaryOrder(const std::vector<BoundaryItem>& items) const {
   std::vector<std::size_t> order(items.size());
   std::iota(order.begin(), order.end(), std::size_t{0});
-  if (BoundaryIndex.empty() || !std::ranges::all_of(items, [](const BoundaryItem& item) { return item.point.has_value(); }))
+  if (BoundaryIndex.empty() ||
+      !std::ranges::all_of(items, [](const BoundaryItem& item) { return item.point.has_value(); }))
     return order;
   std::vector<int> places;
   for (const BoundaryItem& item : items)

@@ -4,6 +4,9 @@
 
 #include <algorithm>
 #include <cmath>
+#include <deque>
+#include <mutex>
+#include <new>
 
 #include "data/datafile_facts.h"
 #include "data/grid_files.h"
@@ -103,6 +106,47 @@ FileResult ComputeZoneAreas(const DomainSource& domain, const GridSource& zones,
   areas.allCells = CountInside(grid);
   areas.cellArea = grid.Geometry().cellSize * grid.Geometry().cellSize;
   return CountCells(grid, zones, progress.Part(0.5, 1), areas.cells);
+}
+
+namespace {
+
+std::shared_ptr<const AreaCells> CountIn(const DomainSource& source, const GridSource& areas) {
+  try {
+    GridData domain;
+    AreaCells cells;
+    const bool isKnown = ReadDomain(source, {}, domain).Ok() && CountCells(domain, areas, {}, cells).Ok();
+    return isKnown ? std::make_shared<const AreaCells>(std::move(cells)) : nullptr;
+  } catch (const std::bad_alloc&) {
+    return nullptr;
+  }
+}
+
+}  // namespace
+
+std::shared_ptr<const AreaCells> AreaCellsOf(const CYbSEKvfBase& node, const GridSource& areas) {
+  // Counting in more cells than these takes longer than a user who types should wait.
+  constexpr std::size_t kMostCellsAtOnce = 4'000'000;
+  DomainSource domain = AskDomain(node);
+  if (!domain.geometry || areas.file.empty() || !domain.geometry->Problem().empty() ||
+      domain.geometry->CellCount() > kMostCellsAtOnce)
+    return nullptr;
+
+  // As many as a setup has sources of areas.
+  constexpr std::size_t kMostKept = 64;
+  struct Known {
+    DomainSource domain;
+    GridSource areas;
+    std::shared_ptr<const AreaCells> cells;
+  };
+  static std::mutex mutex;
+  static std::deque<Known> kept;
+  const std::lock_guard lock(mutex);
+  for (const Known& known : kept)
+    if (known.domain == domain && known.areas == areas) return known.cells;
+  auto cells = CountIn(domain, areas);
+  kept.push_front({std::move(domain), areas, cells});
+  if (kept.size() > kMostKept) kept.pop_back();
+  return cells;
 }
 
 }  // namespace tervane

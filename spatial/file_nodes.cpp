@@ -41,20 +41,20 @@ DataFileRequest DataFileNode::WithSimulationPeriod(DataFileRequest request) cons
   return request;
 }
 
+std::string DataFileNode::WhyNotValid() const {
+  if (!IsFileUsed()) return {};
+  return File.IsEmpty() ? kNoFile : WhyNotMet(File.Absolute(), Items, SetUpNdsValidation());
+}
+
 int DataFileNode::ValidateData() {
   if (!IsFileUsed()) return 1;
-  if (File.IsEmpty()) {
-    AddError(kNotValid, "FILE_NAME", kNoFile);
-    return 0;
-  }
-  const std::string path = File.Absolute();
-  const DataFileRequest request = SetUpNdsValidation();
-  if (const std::string reason = WhyNotMet(path, Items, request); !reason.empty()) {
+  if (const std::string reason = WhyNotValid(); !reason.empty()) {
     AddError(kNotValid, "FILE_NAME", reason);
     return 0;
   }
   if (ChecksPeriod())
-    if (const std::string reason = WhyNotMet(path, Items, WithSimulationPeriod(request)); !reason.empty())
+    if (const std::string reason = WhyNotMet(File.Absolute(), Items, WithSimulationPeriod(SetUpNdsValidation()));
+        !reason.empty())
       AddWarning("The file does not cover the simulation", "FILE_NAME", reason);
   for (Finding& finding : MisplacementOf(*this, *UsedFile())) AddFinding(std::move(finding));
   return 1;
@@ -88,10 +88,14 @@ void CData2DShpFile::Choose(FileName file, std::string attribute) {
   if (!attribute.empty()) Items.push_back(std::move(attribute));
 }
 
+FileResult CData2DShpFile::CheckFile() const {
+  if (!IsFileUsed()) return {};
+  return File.IsEmpty() ? FileResult{kNoFile, {}} : CheckShapeFile(File.Absolute(), request_, Attribute());
+}
+
 int CData2DShpFile::ValidateData() {
   if (!IsFileUsed()) return 1;
-  const FileResult checked =
-      File.IsEmpty() ? FileResult{kNoFile, {}} : CheckShapeFile(File.Absolute(), request_, Attribute());
+  const FileResult checked = CheckFile();
   if (!checked.Ok()) {
     AddError(kNotValid, "FILE_NAME", checked.error);
     return 0;

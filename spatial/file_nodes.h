@@ -50,6 +50,8 @@ class DataFileNode : public YbSENdsSelection, public FileUser {
   virtual DataFileRequest SetUpNdsValidation() const;
   /// The same with the period that a chosen file must cover.
   virtual DataFileRequest SelectionRequest() const { return SetUpNdsValidation(); }
+  /// Why the file cannot be used; empty for a valid one, and while it is not in use.
+  std::string WhyNotValid() const;
   /// "File is not valid" with the reason behind it; warnings where a usable file does not cover the simulation, or does
   /// not lie where the model domain lies.
   int ValidateData() override;
@@ -127,9 +129,12 @@ class CData2DShpFile : public YbSEShpSelection, public FileUser {
   bool IsFileUsed() const { return ValidateFlag != 0 && usedWhen_.Holds(*this); }
   /// The owner's key of the unit of coordinates; metres where none is told.
   void SetAxisUnit(const int& unit) { axisUnit_ = &unit; }
-  void SetPolygonShape(int accepted) { request_.polygons = accepted != 0; }
-  void SetLineShape(int accepted) { request_.lines = accepted != 0; }
-  void SetPointShape(int accepted) { request_.points = accepted != 0; }
+  // Who asks for a kind of shapes asks for the attribute that holds their values.
+  void SetPolygonShape(int accepted) { AskFor(request_.polygons, accepted); }
+  void SetLineShape(int accepted) { AskFor(request_.lines, accepted); }
+  void SetPointShape(int accepted) { AskFor(request_.points, accepted); }
+  /// The shapes themselves are all that is needed.
+  void NeedNoAttribute() { request_.needsAttribute = false; }
   /// The attribute is to hold real or whole numbers.
   void UseRealField() { request_.attribute = AttributeKind::Real; }
   void UseWholeField() { request_.attribute = AttributeKind::Whole; }
@@ -139,10 +144,18 @@ class CData2DShpFile : public YbSEShpSelection, public FileUser {
   void Choose(FileName file, std::string attribute);
 
   const ShapeRequest& Request() const { return request_; }
+  /// Why the file cannot be used; empty for a valid one, and while it is not in use.
+  std::string WhyNotValid() const { return CheckFile().error; }
   int ValidateData() override;
   std::optional<FileUse> UsedFile() const override;
 
  private:
+  void AskFor(bool& kind, int accepted) {
+    kind = accepted != 0;
+    request_.needsAttribute |= kind;
+  }
+  FileResult CheckFile() const;
+
   ShapeRequest request_;
   Condition usedWhen_;
   const int* axisUnit_ = nullptr;

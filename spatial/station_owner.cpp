@@ -25,9 +25,15 @@ void CStationBasedKvf::ExchangeKeys(KeyExchange& keys) {
   ExchangeSourceKeys(keys);
 }
 
+void CStationBasedKvf::Load(KvfNode* parentSection) {
+  ownersSection_ = parentSection;
+  CTvnKvfBase::Load(parentSection);
+  ownersSection_ = nullptr;
+}
+
 void CStationBasedKvf::ReadData(KvfNode* section) {
   // The parent is walking its children, and goes on to read the stations.
-  ReadCount(section);
+  ReadCount(section, ownersSection_);
   CTvnKvfBase::ReadData(section);
 }
 
@@ -50,6 +56,11 @@ int StationKvf::GetNumberWhatAmI() const {
     ++others;
   }
   return parent->GetNumberWhatIs(this) - others;
+}
+
+const ZoneSource* StationKvf::AreaSource() const {
+  const auto* owner = dynamic_cast<const StationOwnerKvf*>(GetParent());
+  return owner ? &owner->Stations() : nullptr;
 }
 
 // ---- The owner

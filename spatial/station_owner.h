@@ -24,10 +24,18 @@ class CStationBasedKvf : public CTvnKvfBase, public ZoneSource {
 
   int& TYPE = Type;  ///< As its section calls it.
 
+  void Load(KvfNode* parentSection) override;
   void ReadData(KvfNode* section) override;
+  int ValidateData() override {
+    CountCells();
+    return 1;
+  }
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  const KvfNode* ownersSection_ = nullptr;  ///< In which the stations stand; set while it is loaded.
 };
 
 /// A station; what it holds is told by the class.
@@ -37,6 +45,9 @@ class StationKvf : public CodedZoneProp {
 
   /// Counted among the stations alone.
   int GetNumberWhatAmI() const override;
+
+ protected:
+  const ZoneSource* AreaSource() const override;
 };
 
 /// The owner. Its constructor makes what holds for the whole model, then calls `NewStations`, then makes what is given

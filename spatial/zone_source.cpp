@@ -36,14 +36,10 @@ void ZoneSource::ExchangeCount(KeyExchange& keys) {
   if (HasZones()) keys.WriteOnly(kind_.countKey, static_cast<int>(ZoneItems(owner_).size()));
 }
 
-void ZoneSource::ReadCount(KvfNode* section) {
+void ZoneSource::ReadCount(KvfNode* section, const KvfNode* zones) {
   if (!HasZones()) return;
   int count = 0;
-  kvfGetParam(section, kind_.countKey, &count, 1, 1);
-  if (count < 0 || count > kLargestItemCount) {
-    kvfAddNote(section, kind_.countKey, count < 0 ? "a negative count is read as 0" : "the count is cut to 1000000");
-    count = std::clamp(count, 0, kLargestItemCount);
-  }
+  if (kvfGetParam(section, kind_.countKey, &count, 1, 1)) count = CountToTake(section, kind_.countKey, count, zones);
   // An old file may hold the zones in two places: what is read later counts.
   for (CFMSEKvfGroupBase* zone : ZoneItems(owner_)) owner_.RemoveChild(zone);
   for (int number = 1; number <= count; ++number) owner_.AddChild(owner_.CreateStationItem());
@@ -94,7 +90,23 @@ CFMSEKvfGroupBase* ZoneSource::SelectZoneByCode(int code) const {
   return nullptr;
 }
 
+void ZoneSource::CountCells() {
+  const bool isKnown =
+      UsesPolygons() ? shapeFile_->WhyNotValid().empty() : UsesGridCodes() && gridFile_->WhyNotValid().empty();
+  cells_ = isKnown && HasZones() ? AreaCellsOf(node_, CurrentSource()) : nullptr;
+}
+
+bool ZoneSource::HasNoCell(const std::string& id) const { return cells_ && !cells_->cellsOfId.contains(id); }
+
 // ---- One zone
+
+int CodedZoneProp::ValidateData() {
+  const ZoneSource* source = AreaSource();
+  if (!source) return 1;
+  const std::string id = source->UsesGridCodes() ? std::to_string(StationCode()) : GRIDCODEID;
+  if (source->HasNoCell(id)) AddWarning("It gets no cell of the model: what it holds is used nowhere", "GRIDCODEID");
+  return 1;
+}
 
 void CodedZoneProp::ExchangeKeys(KeyExchange& keys) {
   for (const auto& [part, key] : zoneKeys_) {

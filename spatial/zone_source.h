@@ -12,6 +12,7 @@
 
 #include "core/condition.h"
 #include "core/key_facts.h"
+#include "spatial/domain_cells.h"
 #include "spatial/data_use.h"
 #include "spatial/file_nodes.h"
 #include "spatial/zone_sync.h"
@@ -69,6 +70,11 @@ class ZoneSource : public CellValues {
   SyncResult SyncZones(const FoundZones& found);
   SyncResult SyncZones() { return SyncZones(FindZones()); }
 
+  /// Counts the cells that each area gets, for the validation of the zones.
+  void CountCells();
+  /// Whether an area of that identity is known to get no cell of the model.
+  bool HasNoCell(const std::string& id) const;
+
   std::vector<std::string> GetZoneTitles() const { return ZoneItemTitles(owner_); }
   /// The zone of that identity, or of that code; null when there is none. By code the search ends at the first zone
   /// whose identity gives a number below 1.
@@ -79,9 +85,9 @@ class ZoneSource : public CellValues {
   void ExchangeSourceKeys(KeyExchange& keys);
   /// Tells the number of zones, where the source has any.
   void ExchangeCount(KeyExchange& keys);
-  /// Makes as many zones as the section tells, with a note where it tells no sensible number. They are loaded later, in
-  /// the walk over the owner's children.
-  void ReadCount(KvfNode* section);
+  /// Makes as many zones as the section tells, as far as that is taken; `zones` holds their sections. They are loaded
+  /// later, in the walk over the owner's children.
+  void ReadCount(KvfNode* section, const KvfNode* zones);
 
  private:
   /// There is nothing to keep in step with.
@@ -93,6 +99,7 @@ class ZoneSource : public CellValues {
   CFMSEKvfBase& owner_;
   CTvnData2DNdsFile* gridFile_;
   CData2DShpFile* shapeFile_;
+  std::shared_ptr<const AreaCells> cells_;  ///< As of the latest validation; null where they are not known.
 };
 
 /// What a key of a zone holds.
@@ -127,9 +134,13 @@ class CodedZoneProp : public CFMSEKvfGroupBase {
   std::string GetStationId() const override { return GRIDCODEID; }
 
   void ReadData(KvfNode* section) override;
+  /// Warns of a zone that gets no cell of the model: what it holds would be used nowhere.
+  int ValidateData() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+  /// Where its area comes from; null for one that stands alone.
+  virtual const ZoneSource* AreaSource() const { return dynamic_cast<const ZoneSource*>(GetParent()); }
 
  private:
   ZoneKeys zoneKeys_;

@@ -58,7 +58,7 @@ std::shared_ptr<CFMSEKvfGroupBase> CodedZonesKvf::CreateStationItem() {
 
 void CodedZonesKvf::ReadData(KvfNode* section) {
   CFMSEKvfBase::ReadData(section);
-  ReadCount(section);
+  ReadCount(section, section);
 }
 
 void CodedZonesKvf::WriteData(KvfFile* file) {

@@ -74,6 +74,10 @@ class CodedZonesKvf : public CFMSEKvfBase, public ZoneSource {
   std::shared_ptr<CFMSEKvfGroupBase> CreateStationItem() override;
   void ReadData(KvfNode* section) override;
   void WriteData(KvfFile* file) override;
+  int ValidateData() override {
+    CountCells();
+    return 1;
+  }
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;

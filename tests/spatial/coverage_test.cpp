@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "spatial/coverage.h"
 
+#include <cmath>
+
 #include <gmock/gmock.h>
 
 #include "core/path.h"
@@ -197,6 +199,12 @@ TEST_F(Coverage, TakesWhatStayedTheSameFromTheBoardBefore) {
   EXPECT_EQ(again->rows.size(), first->rows.size());
   document_.Root().Important(kSimulationPeriod)->SIMEND = CYbDateTime(2003, 1, 1);
   EXPECT_EQ(RowOf(*Board(again.get()), "rain.nds0").TimeText(), "ends 365 days early");
+
+  // What is no number does not make each look another one.
+  Rain().Global().TYPE = CGlobalKvf::kConstant;
+  Rain().Global().FIXED_VALUE = std::nanf("");
+  document_.Root().Important(kDomain)->y0Shp = std::nan("");
+  EXPECT_EQ(AskCoverage(document_.Root()), AskCoverage(document_.Root()));
 
   Progress progress;
   progress.Cancel();

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "spatial/data2d.h"
 
+#include <cmath>
 #include <functional>
 
 #include <gmock/gmock.h>
@@ -56,6 +57,12 @@ TEST_F(Data2D, AGridIsBuiltAnewWhenWhatDecidesItHasChangedAndOnlyThen) {
        kNew, 2},
       {"no item selected", [&] { ground.GridFile().Items.clear(); }, kSame, 2},
       {"an item that is not there", [&] { ground.GridFile().Items = {2}; }, kNone, 0},
+      {"a file of another quantity",
+       [&] {
+         test::WriteGrid(folder.File("rain.nds2"), {2, 1, 5, 0, 0, 0, {}}, {8, 9}, 100431);
+         ground.GridFile().Choose(FileName("rain.nds2", folder.Path()));
+       },
+       kNone, 0},
       {"points", [&] { ground.Type = CData2DKvf::kShapeFile; }, kNew, 4},
       {"asked again", [] {}, kSame, 4},
       {"the rotation", [&] { domain.rotationShp = 0; }, kNew, 4},
@@ -67,11 +74,14 @@ TEST_F(Data2D, AGridIsBuiltAnewWhenWhatDecidesItHasChangedAndOnlyThen) {
       {"a refresh", [&] { ground.SetGridDataValid(0); }, kNew, 6},
       {"the file is gone", [&] { ground.ShapeFile().Choose(FileName("none.shp", folder.Path()), "CODE"); }, kNone, 0},
       {"a text of points", [&] { ground.Type = CData2DKvf::kXyzFile; }, kNew, 6},
+      {"a radius that is no number", [&] { ground.SearchRadius = std::nanf(""); }, kNone, 0},
+      {"a corner that is no number", [&] { domain.x0Shp = std::nan(""); }, kNone, 0},
   };
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> before;
   for (const auto& step : steps) {
     SCOPED_TRACE(step.what);
     step.change();
+    EXPECT_EQ(ground.GridComputation(), ground.GridComputation());
     std::string problem;
     const auto grid = ground.GetGridData(&problem);
     EXPECT_EQ(grid == nullptr, step.expected == kNone);
@@ -92,6 +102,9 @@ TEST_F(Data2D, ShapesAreKeptLikewiseAndANewGridLeavesTheKeptOneAlone) {
   ASSERT_NE(shapes, nullptr);
   EXPECT_EQ(shapes->GetData().size(), 2U);
   EXPECT_EQ(ground.GetShapeData(), shapes);
+  ground.SearchRadius = std::nanf("");
+  EXPECT_EQ(ground.ShapeComputation(), ground.ShapeComputation());
+  ground.SearchRadius = 1000;
   const auto grid = ground.GetGridData();
   const auto made = ground.CreateGridData();
   ASSERT_NE(made, nullptr);

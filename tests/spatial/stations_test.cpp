@@ -2,11 +2,14 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "spatial/stations.h"
 
+#include <filesystem>
 #include <functional>
 
 #include <fmt/ranges.h>
 #include <gmock/gmock.h>
 
+#include "platform/item_types.h"
+#include "spatial/domain.h"
 #include "surface/climate.h"
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
@@ -165,7 +168,7 @@ TEST_F(Stations, OfACountThatTheFileDoesNotHoldAreAtTheirDefaults) {
   const struct {
     const char* count;
     std::size_t stations, notes;
-  } cases[] = {{"3", 3, 0}, {"0", 0, 0}, {"-1", 0, 1}};
+  } cases[] = {{"3", 3, 0}, {"0", 0, 0}, {"-1", 0, 1}, {"2147483647", 1001, 1}};  // One section stands there, of another kind.
   for (const auto& c : cases) {
     CFlowModelDoc opened;
     ASSERT_TRUE(opened.OpenText(
@@ -178,6 +181,48 @@ TEST_F(Stations, OfACountThatTheFileDoesNotHoldAreAtTheirDefaults) {
     EXPECT_EQ(opened.Report().entries.size(), c.notes);
     for (const CFMSEKvfGroupBase* station : ZoneItems(read)) EXPECT_EQ(station->GetStationName(), "Undefined");
   }
+}
+
+TEST_F(Stations, APolygonFileNeedsTheAttributeThatTellsTheStationsApart) {
+  UsePolygons(AttributeKind::Text, {"A", "B"});
+  CData2DShpFile& file = forcing.Stations().ShapeFile();
+  const auto why = [&](const char* attribute) {
+    file.Choose(FileName("areas.shp", folder.Path()), attribute);
+    document.Root().Validate();
+    return file.Findings().empty() ? std::string()
+                                   : file.Findings().front().text + ": " + file.Findings().front().detail;
+  };
+  EXPECT_EQ(why("CODE"), "");
+  EXPECT_THAT(why(""), HasSubstr("File is not valid: " + folder.File("areas.shp") + ": no attribute is selected"));
+  EXPECT_THAT(why("NOWHERE"), HasSubstr("NOWHERE"));
+  std::filesystem::remove(folder.File("areas.dbf"));
+  EXPECT_THAT(why("CODE"), HasSubstr("does not exist beside it"));
+}
+
+TEST_F(Stations, WithoutACellOfTheModelAreWarnedOf) {
+  test::WriteGrid(folder.File("domain.nds2"), {3, 1, 100, 0, 0, 0, {}}, {2, 1, kUsualDeleteValue}, quantity::kCode);
+  document.Root().Important(kDomain)->GridFile().Choose(FileName("domain.nds2", folder.Path()));
+  test::WriteGrid(folder.File("codes.nds2"), {3, 1, 100, 0, 0, 0, {}}, {4, 7, 9}, quantity::kCode);
+  forcing.DistributionType = Forcing::kStationBased;
+  forcing.Stations().TYPE = CStationBasedKvf::kGridCodes;
+  forcing.Stations().GridFile().Choose(FileName("codes.nds2", folder.Path()));
+  forcing.SyncStations();
+  ASSERT_EQ(Ids(), "4 7 9");
+  const auto warned = [&] {
+    document.Root().Validate();
+    std::string ids;
+    for (const CFMSEKvfGroupBase* station : ZoneItems(forcing))
+      for (const Finding& finding : station->Findings())
+        if (finding.text.starts_with("It gets no cell")) ids += station->GetStationId() + " ";
+    return ids;
+  };
+  EXPECT_EQ(warned(), "9 ");  // Outside the domain.
+  At("7").SetStationId("007");
+  At("4").SetStationId("5");
+  EXPECT_EQ(warned(), "5 9 ");
+  // Where the areas are not known, nothing is said of them.
+  forcing.Stations().GridFile().Choose(FileName("gone.nds2", folder.Path()));
+  EXPECT_EQ(warned(), "");
 }
 
 TEST_F(Stations, OnlyTheFileOfTheStateInForceIsChecked) {

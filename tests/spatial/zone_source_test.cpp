@@ -137,7 +137,7 @@ TEST_F(ZoneSources, EachKindOfZonesIsReadAndWrittenByItsRow) {
 TEST_F(ZoneSources, ACountThatMakesNoSenseIsToldOfItsKey) {
   Make(kAlwaysDistributed);
   EXPECT_THAT(test::LoadText(root, "section Boundaries { NoBoundaries = -3; }"),
-              ElementsAre("Boundaries:NoBoundaries: a negative count is read as 0"));
+              ElementsAre("Boundaries:NoBoundaries: a count of -3 reads as 0"));
 }
 
 TEST_F(ZoneSources, EachKindFollowsItsSourceByItsRow) {
