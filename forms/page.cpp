@@ -20,6 +20,11 @@ void CYbSEDlgBase::MakeForm() {
 void CYbSEDlgBase::Initialize() {
   MakeForm();
   SetData();
+  // A page that only reads changes nothing, nor does one that takes the place of a page that was shown: a step that was
+  // undone would come again.
+  if (!context_.updateDoc || context_.isReplacement) return;
+  for (const PageForm::Mend& each : form_->Mends())
+    if (each.mend()) UpdateDoc(kDataChanged, each.action);
 }
 
 void CYbSEDlgBase::UpdateDoc(int hint, const std::string& action, const void* source) const {

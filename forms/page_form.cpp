@@ -17,7 +17,7 @@
 
 namespace tervane {
 
-std::string_view KindName(ControlKind kind) {
+std::string_view NameOf(ControlKind kind) {
   constexpr std::array<std::string_view, 23> names{"check",  "radio",  "choice",  "text",      "long text", "integer",
                                                    "number", "date",   "file",    "label",     "button",    "table",
                                                    "shown",  "notice", "view",    "text file", "browser",   "report",
@@ -340,6 +340,21 @@ void PageForm::Follow() {
   });
 }
 
+std::string SummaryOf(const Control& control) {
+  switch (control.kind) {
+    case ControlKind::Map:
+      return Summary(Finished(control.map));
+    case ControlKind::Chart:
+      return Summary(Finished(control.chart));
+    case ControlKind::Section:
+      return Summary(Finished(control.section));
+    case ControlKind::Report:
+      return Summary(ReadReport(control.Text()));
+    default:
+      return {};
+  }
+}
+
 namespace {
 
 std::string ShownValue(const Control& control) {
@@ -357,13 +372,10 @@ std::string ShownValue(const Control& control) {
       return Replaced(fmt::format(" = {} of [{}]", shown, fmt::join(options, " | ")), "\n", " ");
     }
     case ControlKind::Map:
-      return " = " + Replaced(Summary(Finished(control.map)), "\n", "\\n");
     case ControlKind::Chart:
-      return " = " + Replaced(Summary(Finished(control.chart)), "\n", "\\n");
     case ControlKind::Section:
-      return " = " + Replaced(Summary(Finished(control.section)), "\n", "\\n");
     case ControlKind::Report:
-      return " = " + Summary(ReadReport(control.Text()));
+      return " = " + Replaced(SummaryOf(control), "\n", "\\n");
     case ControlKind::Label:
     case ControlKind::Button:
     case ControlKind::Group:
@@ -375,6 +387,41 @@ std::string ShownValue(const Control& control) {
   }
 }
 
+/// What a reader sees of a page of HTML, without its form.
+std::string TextOfHtml(std::string_view html) {
+  std::string text;
+  const std::size_t body = html.find("<body");
+  if (body != std::string_view::npos) html.remove_prefix(body);
+  bool isTag = false;
+  for (const char c : html) {
+    if (c == '<') isTag = true;
+    if (!isTag) text += c;
+    if (c == '>') isTag = false;
+  }
+  constexpr std::pair<std::string_view, std::string_view> kNames[] = {
+      {"&lt;", "<"}, {"&gt;", ">"}, {"&quot;", "\""}, {"&nbsp;", " "}, {"&amp;", "&"}};
+  for (const auto& [name, sign] : kNames) text = Replaced(text, name, sign);
+  return text;
+}
+
+/// A text of several lines as it is read, each with its indent.
+std::string Lines(std::string_view text, const std::string& indent) {
+  std::string lines;
+  while (!text.empty()) {
+    const std::size_t end = text.find('\n');
+    std::string_view line = text.substr(0, end);
+    while (!line.empty() && (line.back() == '\r' || line.back() == ' ')) line.remove_suffix(1);
+    if (!line.empty()) lines += fmt::format("{}{}\n", indent, line);
+    text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
+  }
+  return lines;
+}
+
+bool IsTextOfLines(const Control& control) {
+  return (control.kind == ControlKind::TextView || control.kind == ControlKind::Browser) &&
+         control.Text().find('\n') != std::string::npos;
+}
+
 }  // namespace
 
 std::string FormText(PageForm& form, int level) {
@@ -382,9 +429,11 @@ std::string FormText(PageForm& form, int level) {
   for (const auto& control : form.Controls()) {
     const std::string indent(2 * static_cast<std::size_t>(level), ' ');
     const std::string unit = control->UnitText();
-    text += fmt::format("{}{} \"{}\"{}{}{}{}\n", indent, KindName(control->kind), Replaced(control->label, "\n", " "),
-                        ShownValue(*control), unit.empty() ? "" : " " + unit, control->IsEnabled() ? "" : " disabled",
+    text += fmt::format("{}{} \"{}\"{}{}{}{}\n", indent, NameOf(control->kind), Replaced(control->label, "\n", " "),
+                        IsTextOfLines(*control) ? "" : ShownValue(*control), unit.empty() ? "" : " " + unit, control->IsEnabled() ? "" : " disabled",
                         control->IsShown() ? "" : " hidden");
+    if (IsTextOfLines(*control))
+      text += Lines(control->kind == ControlKind::Browser ? TextOfHtml(control->Text()) : control->Text(), indent + "  ");
     if (control->group) text += FormText(*control->group, level + 1);
     if (control->table) text += TableText(*control->table, level + 1);
     if (control->kind == ControlKind::SubForms) {

@@ -85,6 +85,7 @@ class Control {
   std::string toolTip;
   std::string unit;                                   ///< A fixed unit; `UnitText` tells what is shown.
   int itemType = 0;                                   ///< The number is a quantity of that item type; 0 for none.
+  std::function<int()> itemTypeBy;                    ///< Asked instead, where other values decide it.
   const DisplayUnits* displayUnits = nullptr;         ///< The user's units; null for base units.
   std::function<std::vector<std::string>()> options;  ///< Of a radio group or drop list.
   std::function<std::vector<std::string>()> offers;   ///< Of a text: what is offered; any other may be typed.
@@ -121,7 +122,7 @@ class Control {
   bool IsShown() const { return shownWhen.Holds(*pageNode); }
   std::string Text() const { return text ? text() : std::string(); }
   std::vector<std::string> Options() const { return options ? options() : std::vector<std::string>(); }
-  FieldUnit NumberUnit() const { return {unit, itemType, displayUnits}; }
+  FieldUnit NumberUnit() const { return {unit, itemTypeBy ? itemTypeBy() : itemType, displayUnits}; }
   /// The unit behind the value, as the user's choice is now; empty for none.
   std::string UnitText() const { return itemType ? NumberUnit().Text() : unit; }
   /// The units that a user may choose to see the quantity in; empty where there is nothing to choose.
@@ -145,6 +146,8 @@ class Control {
   Control& Unit(std::string text_) { return unit = std::move(text_), *this; }
   /// The node stores the base unit of that item type; the number is shown and typed in the user's unit.
   Control& Quantity(int itemType_) { return itemType = itemType_, *this; }
+  /// The same where other values decide it.
+  Control& QuantityBy(std::function<int()> itemType_) { return itemTypeBy = std::move(itemType_), *this; }
   Control& Beside() { return beside = true, *this; }
   /// The key of a control over functions, so that findings and search lead to it; of another node than the page's.
   Control& Key(std::string name) { return key = std::move(name), *this; }
@@ -249,6 +252,17 @@ class PageForm {
   /// How dates are shown and typed.
   static constexpr std::string_view kDateFormat = "%Y/%m/%d  %H:%M";
 
+  /// What is put right when the page is shown to a user: a choice of what is no longer there. `mend` is true when it
+  /// changed something, which is then a step to undo of that name.
+  void MendWhenShown(std::string action, std::function<bool()> mend) {
+    mends_.push_back({std::move(action), std::move(mend)});
+  }
+  struct Mend {
+    std::string action;
+    std::function<bool()> mend;
+  };
+  const std::vector<Mend>& Mends() const { return mends_; }
+
  private:
   Control& Add(ControlKind kind, std::string label);
   /// A control of the key that is bound to this member.
@@ -259,7 +273,13 @@ class PageForm {
   CYbSEKvfBase& node_;
   std::vector<std::unique_ptr<Control>> controls_;
   std::shared_ptr<BoundKeys> keys_;
+  std::vector<Mend> mends_;
 };
+
+/// "check", "long text"
+std::string_view NameOf(ControlKind kind);
+/// What a control that holds no value shows, in short: "grid 142x97, 29 shapes"; empty for other kinds.
+std::string SummaryOf(const Control& control);
 
 /// A form as text, one line for each control in the order of the page: kind, label in double quotes, value, unit, and
 /// `disabled` or `hidden` where it is so.

@@ -108,6 +108,7 @@ MapContent DataFileView::Map() {
     return map;
   }
   CTvnData2DNdsFile file(nullptr);
+  file.SetFileUsed(0);  // any grid is shown, also one of several layers
   file.File = FileName(path_, {});
   file.Items = {chosen_.front()};
   map = FileMap(file, slice_);

@@ -11,6 +11,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <functional>
+#include <new>
 #include <string>
 #include <unordered_map>
 #include <utility>
@@ -69,6 +70,21 @@ QImage WithFewColors(const QImage& image) {
   }
   return image.convertToFormat(QImage::Format_Indexed8, table, Qt::ThresholdDither | Qt::AvoidDither);
 }
+
+/// Memory that is refused is told, and the program goes on with what it has.
+class Application : public QApplication {
+ public:
+  using QApplication::QApplication;
+
+  bool notify(QObject* receiver, QEvent* event) override {
+    try {
+      return QApplication::notify(receiver, event);
+    } catch (const std::bad_alloc&) {
+      std::fprintf(stderr, "quarzel: there is not enough memory for this\n");
+      return false;
+    }
+  }
+};
 
 int Run(const Typed& typed, QApplication& application) {
   // A picture shows the program as it is for everybody, and leaves nothing in the user's settings.
@@ -139,11 +155,16 @@ int main(int argc, char** argv) {
   commandLine.set_version_flag("--version", "quarzel 0.1.0");
   CLI11_PARSE(commandLine, argc, argv);
 
-  QApplication application(argc, argv);
+  Application application(argc, argv);
   QApplication::setApplicationName("Quarzel");
   QApplication::setApplicationVersion("0.1.0");
   QTranslator translator;
   if (translator.load(QLocale(), "quarzel", "_", QApplication::applicationDirPath() + "/translations"))
     QApplication::installTranslator(&translator);
-  return Run(typed, application);
+  try {
+    return Run(typed, application);
+  } catch (const std::bad_alloc&) {
+    std::fprintf(stderr, "quarzel: there is not enough memory for this\n");
+    return 2;
+  }
 }

@@ -179,6 +179,7 @@ MapContent GridFileMap(const CYbSEKvfBase& node, const std::string& path, int it
 
 MapContent FileMap(const DataFileNode& file, const GridSlice& slice) {
   if (file.File.IsEmpty()) return GridMap(file, nullptr, "No file is chosen.");
+  if (const std::string why = file.WhyNotValid(); !why.empty()) return GridMap(file, nullptr, why);
   return GridFileMap(file, file.File.Absolute(), file.SelectedItem(), slice);
 }
 
@@ -188,6 +189,8 @@ MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit) {
     map.message = "No file is chosen.";
     return map;
   }
+  map.message = file.WhyNotValid();
+  if (!map.message.empty()) return map;
   const auto shapes = RecentShapes(file.File.Absolute(), file.Attribute(), axisUnit);
   if (auto data = NowOrAwaited(shapes, map.awaited))
     map.shapes.push_back({std::move(data), {}});

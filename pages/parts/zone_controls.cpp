@@ -39,10 +39,12 @@ Control& GapFillChoice(PageForm& form, std::string& filler, const CFMSEKvfBase& 
       .Key("ShapeGapFillName");
 }
 
-/// Sets `filler` to the first zone when none has that name.
-void KeepGapFill(std::string& filler, const CFMSEKvfBase& owner) {
+/// Sets `filler` to the first zone when none has that name; true when it did.
+bool KeepGapFill(std::string& filler, const CFMSEKvfBase& owner) {
   const std::vector<std::string> names = ZoneItemTitles(owner);
-  if (!names.empty() && std::ranges::find(names, filler) == names.end()) filler = names.front();
+  if (names.empty() || std::ranges::find(names, filler) != names.end()) return false;
+  filler = names.front();
+  return true;
 }
 
 /// Looks for zones while the user may watch and give up; then they are unreadable.
@@ -138,8 +140,11 @@ void DescribeZoneSource(PageForm& form, const CYbSEDlgBase& page, ZoneSource& so
   form.Shown("Item Name:", [&source] { return source.ShapeFile().Attribute(); }).ShownWhen(byPolygons);
   UnitKeyChoice(form, words.units, "ShapeAxisUnit", source.ShapeAxisUnit, quantity::kMapCoordinate)
       .ShownWhen(byPolygons);
-  if (source.SourceKind().hasGapFill)
-    GapFillChoice(form, source.ShapeGapFillName, source.Owner()).ShownWhen(byPolygons);
+  if (!source.SourceKind().hasGapFill) return;
+  GapFillChoice(form, source.ShapeGapFillName, source.Owner()).ShownWhen(byPolygons);
+  form.MendWhenShown("Fill Gaps with the First Zone", [&source] {
+    return source.UsesPolygons() && KeepGapFill(source.ShapeGapFillName, source.Owner());
+  });
 }
 
 MapContent ZoneMap(const ZoneSource& source, const CFMSEKvfGroupBase* highlighted) {

@@ -29,6 +29,8 @@ class CSimPeriodDlg : public PageOf<CSimPeriodKvf> {
  private:
   void LoadHotStartDates();
   void ChooseHotStartDate(int index);
+  /// Gives up a date that the list does not have; true when there was one.
+  bool GiveUpLostDate();
   /// The start comes from the hot start.
   bool StartsHot() const;
 };
@@ -60,6 +62,16 @@ void CSimPeriodDlg::ChooseHotStartDate(int index) {
   const bool exists = index >= 0 && index < static_cast<int>(n.HotStartDates.size());
   n.HotStartDateIndex = exists ? index : 0;
   n.HotStartDate = exists ? n.HotStartDates[static_cast<std::size_t>(index)] : std::string();
+}
+
+bool CSimPeriodDlg::GiveUpLostDate() {
+  CSimPeriodKvf& n = Node();
+  const bool isListed = n.HotStartDateIndex >= 0 && n.HotStartDateIndex < static_cast<int>(n.HotStartDates.size());
+  const bool isChosen = n.HotStartDateIndex != 0 || CYbDateTime::Parse(n.HotStartDate, n.kHotStartFormat).IsValid();
+  if (isListed || !isChosen) return false;
+  ChooseHotStartDate(n.HotStartDateIndex);
+  n.SetRevalidateAll();
+  return true;
 }
 
 bool CSimPeriodDlg::StartsHot() const {
@@ -99,6 +111,7 @@ void CSimPeriodDlg::Describe(PageForm& form) {
       .Key("HotStartDate")
       .EnabledWhen(isHot)
       .RevalidatesLater();
+  form.MendWhenShown("Give Up Lost Hot Start Date", [this] { return GiveUpLostDate(); });
   hot.Check("Use hot start date for simulation start date", n.SimStartFromHotStartDate)
       .EnabledWhen(isHot &&
                    Sentence("a hot start result file is chosen", [&n] { return !n.HotStartResultFile.IsEmpty(); }))

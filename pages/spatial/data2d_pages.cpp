@@ -39,6 +39,7 @@ MapContent CData2DDlg::Map() {
   CData2DKvf& n = Node();
   const bool isScattered = n.Type == CData2DKvf::kShapeFile || n.Type == CData2DKvf::kXyzFile;
   if (!n.ShowGridData && !(isScattered && n.ShowShapeData)) return {};
+  if (const std::string why = n.WhyFileNotValid(); !why.empty()) return GridMap(n, nullptr, why);
   MapContent map = GridMap(n, n.ShowGridData ? n.GridComputation() : nullptr);
   if (!map.grids.empty()) map.grids.front().isCodes = n.IsCode();
   if (!isScattered || !n.ShowShapeData) return map;
@@ -70,7 +71,8 @@ void CData2DDlg::Describe(PageForm& form) {
         .Key("FixedValue")
         .ShownWhen(isUniform);
   } else {
-    form.Number("Value", n.FixedValue).ShownWhen(isUniform);
+    // Another quantity while the values are relative to ground.
+    form.Number("Value", n.FixedValue).QuantityBy([&n] { return n.GetItemType(); }).ShownWhen(isUniform);
   }
   form.DataFile("Filename:", n.GridFile()).Filter(kGridFileFilter).DefaultExtension("nds2").ShownWhen(isGrid);
   form.ShapeFile("Filename:", n.ShapeFile()).Filter(kShapeFileFilter).DefaultExtension("shp").ShownWhen(isShape);

@@ -109,7 +109,7 @@ QWidget* ControlWidget::MakeUnit() {
       action->setChecked(choice.key == control_.NumberUnit().Key());
       connect(action, &QAction::triggered, this, [this, key = choice.key] {
         Commit();
-        emit UnitChosen(control_.itemType, key);
+        emit UnitChosen(control_.NumberUnit().itemType, key);
       });
     }
   });

@@ -91,6 +91,32 @@ TEST_F(ZoneControls, ShowWhatTheKindOfSourceHasAndItsStateAsksFor) {
   }
 }
 
+TEST_F(ZoneControls, AGapFillerThatNoZoneBearsBecomesTheFirstWhenAUserSeesThePage) {
+  for (const int type : {ZoneSource::kGridCodes, ZoneSource::kPolygons}) {
+    node = document.Root().NewChild<CodedZonesKvf>(kUsual);
+    node->DistributionType = CodedZonesKvf::kDistributed;
+    node->Type = type;
+    node->ShapeGapFillName = "gone";
+    for (const char* name : {"forest", "meadow"}) {
+      auto zone = std::make_shared<AreaZone>(node);
+      zone->SetStationName(name);
+      zone->SetAbbreviatedTitle(name);
+      node->AddChild(std::move(zone));
+    }
+    changes.clear();
+    const auto show = [this](bool isReplacement) {
+      PageContext context{document, host,
+                          [this](int, const std::string& action, const void*) { changes.push_back(action); }};
+      context.isReplacement = isReplacement;
+      ZonesPage<kWords>(*node, context).Initialize();
+      return node->ShapeGapFillName;
+    };
+    EXPECT_EQ(show(true), "gone");  // A step that was undone would come again.
+    EXPECT_EQ(show(false), type == ZoneSource::kPolygons ? "forest" : "gone");
+    EXPECT_EQ(changes.size(), type == ZoneSource::kPolygons ? 1U : 0U);
+  }
+}
+
 TEST_F(ZoneControls, AChosenFileBringsTheZonesInStepWhereThereAreAny) {
   test::WriteCodes(folder.File("codes.nds2"), {4, 2});
   const struct {

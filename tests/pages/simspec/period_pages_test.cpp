@@ -2,8 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/simspec/period_pages.h"
 
+#include <fmt/format.h>
 #include <gmock/gmock.h>
 
+#include "simspec/periods.h"
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -54,6 +56,37 @@ TEST(PeriodPages, AHotStartDateIsChosenFromTheResultFileAndBecomesTheStart) {
   page.Enter("Use hot start data", "0");
   EXPECT_TRUE(page.IsEnabled("Start Date:"));
   EXPECT_EQ(ValueOf(document, "SimSpec/SimulationPeriod:SIMSTART"), "2000, 1, 1, 0, 0");
+}
+
+TEST(PeriodPages, AHotStartDateThatTheListDoesNotHaveIsGivenUpWhenAUserSeesThePage) {
+  const TempFolder folder;
+  folder.Write("flow.tvdres", kCatalogue);
+  const struct {
+    const char *file, *index, *date;
+    bool isGivenUp;
+  } cases[] = {{"flow.tvdres", "3", "2000, 1, 2, 0, 0", false},
+               {"flow.tvdres", "4", "2000, 1, 2, 6, 0", true},
+               {"gone.tvdres", "0", "2000, 1, 2, 6, 0", true},
+               {"gone.tvdres", "0", "0, 0, 0, 0, 0", false}};
+  for (const auto& c : cases) {
+    SCOPED_TRACE(c.index);
+    CFlowModelDoc document;
+    ASSERT_TRUE(document.OpenText(
+        SetupText(14, fmt::format("section SimSpec {{\nsection SimulationPeriod {{\nHotStart = 1\n"
+                                  "HotStartResultFile = file \"{}\"\nHotStartDate = {}\nHotStartDateIndex = {}\n}}\n}}",
+                                  c.file, c.date, c.index)),
+        folder.File("a.tvd")));
+    // A page that is only read changes nothing.
+    NobodyToAsk nobody;
+    auto& period = *document.Root().Important(kSimulationPeriod);
+    MakePage(kSimPeriodPage, period, {document, nobody, {}});
+    EXPECT_EQ(ValueOf(document, "SimSpec/SimulationPeriod:HotStartDate"), c.date);
+    PageDriver page(document, "SimSpec/SimulationPeriod");
+    EXPECT_EQ(page.Changes(),
+              c.isGivenUp ? std::vector<std::string>{"1 Give Up Lost Hot Start Date"} : std::vector<std::string>());
+    EXPECT_EQ(ValueOf(document, "SimSpec/SimulationPeriod:HotStartDate"), c.isGivenUp ? "0, 0, 0, 0, 0" : c.date);
+    EXPECT_EQ(ValueOf(document, "SimSpec/SimulationPeriod:HotStartDateIndex"), c.isGivenUp ? "0" : c.index);
+  }
 }
 
 TEST(PeriodPages, RecyclingDecidesWhichDatesCount) {
