@@ -10,6 +10,7 @@
 #include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "pages/findings.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -17,7 +18,7 @@ namespace {
 
 struct CheckOptions {
   std::string file;
-  bool json = false, coverage = false;
+  bool json = false, coverage = false, each = false;
 };
 
 std::string_view KindName(KvfUnread::Kind kind) {
@@ -56,27 +57,41 @@ void WriteJson(const std::vector<SetupFinding>& findings, std::ostream& out) {
   fmt::print(out, "{}\n", JsonObject({{"findings", JsonArray(found)}, {"unread", JsonArray(notRead)}}));
 }
 
-void WriteText(const std::string& file, const std::vector<SetupFinding>& findings, std::ostream& out) {
-  for (const SetupFinding& finding : findings) {
-    const std::string line = finding.line > 0 ? fmt::format("{}:", finding.line) : std::string();
-    const std::string key = finding.key.empty() ? std::string() : ":" + finding.key;
-    const std::string place = finding.path + key;
-    // What belongs to no node, as a comment, has no place; a remark on the whole file keeps its colon.
-    const bool hasPlace = !place.empty() || finding.kind != SetupFinding::Kind::Unread;
-    fmt::print(out, "{}:{} {}: {}{}{}{}\n", file, line, KindName(finding.kind), place, hasPlace ? ": " : "",
-               finding.text, finding.detail.empty() ? std::string() : fmt::format(" ({})", finding.detail));
+void WriteFinding(const std::string& file, const SetupFinding& finding, std::ostream& out) {
+  const std::string line = finding.line > 0 ? fmt::format("{}:", finding.line) : std::string();
+  const std::string key = finding.key.empty() ? std::string() : ":" + finding.key;
+  const std::string place = OneLine(finding.path + key);
+  // What belongs to no node, as a comment, has no place; a remark on the whole file keeps its colon.
+  const bool hasPlace = !place.empty() || finding.kind != SetupFinding::Kind::Unread;
+  fmt::print(out, "{}:{} {}: {}{}{}{}\n", file, line, KindName(finding.kind), place, hasPlace ? ": " : "",
+             OneLine(finding.text),
+             finding.detail.empty() ? std::string() : fmt::format(" ({})", OneLine(finding.detail)));
+}
+
+void WriteText(const std::string& file, const std::vector<SetupFinding>& findings, bool each, std::ostream& out) {
+  for (const FindingGroup& group : GroupsOf(findings)) {
+    if (!each && group.IsOfMany()) {
+      const SetupFinding& first = group.First();
+      fmt::print(out, "{}: {}: {}{}{}: {}: {} times{}\n", file, KindName(first.kind), OneLine(group.place),
+                 first.key.empty() ? "" : ":", first.key, OneLine(first.text), group.findings.size(),
+                 first.detail.empty() ? std::string()
+                 : group.isSameDetail ? fmt::format(" ({})", OneLine(first.detail))
+                                      : fmt::format(" (such as {})", OneLine(first.detail)));
+      continue;
+    }
+    for (const SetupFinding* finding : group.findings) WriteFinding(file, *finding, out);
   }
   if (findings.empty()) fmt::print(out, "{}: no findings\n", file);
 }
 
-int CheckCommand(const std::string& file, bool json, Streams streams) {
+int CheckCommand(const std::string& file, bool json, bool each, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   const std::vector<SetupFinding> findings = FindingsOf(document);
   if (json)
     WriteJson(findings, streams.out);
   else
-    WriteText(file, findings, streams.out);
+    WriteText(file, findings, each, streams.out);
   return std::ranges::any_of(findings, NeedsAttention) ? kFindings : kDone;
 }
 
@@ -87,10 +102,11 @@ void OfferCheckCommand(CommandOffers& offers) {
   CLI::App* check = offers.Command(
       "check", "List errors, warnings, notes and what the file holds that nothing reads", [offers, options] {
         return options->coverage ? CoverageCommand(options->file, options->json, offers.Output())
-                                 : CheckCommand(options->file, options->json, offers.Output());
+                                 : CheckCommand(options->file, options->json, options->each, offers.Output());
       });
   AddSetup(check, options->file);
   check->add_flag("--json", options->json, "As JSON");
+  check->add_flag("--each", options->each, "Each finding on a line, also where many have one cause");
   check->add_flag("--coverage", options->coverage,
                   "Instead, how the data cover simulation and domain, and what the forcings come to each year");
 }

@@ -2,9 +2,16 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "cli/command_line.h"
 
+#include <new>
+#include <span>
+#include <string>
+#include <vector>
+
 #include <fmt/format.h>
 
 #include "cli/offers.h"
+#include "cli/printable_stream.h"
+#include "platform/os.h"
 #include "platform/text.h"
 #include "platform/units.h"
 
@@ -29,13 +36,32 @@ constexpr void (*kFiles[])(CommandOffers&) = {
 /// Quantities whose names contain the typed word, for users who do not know the codes.
 std::string NearQuantities(const std::string& typed) {
   std::string near;
-  const std::string lower = LowerCase(typed);
+  const std::string lower = LowerCase(Trimmed(typed));
+  if (lower.empty()) return "such as Elevation (100180)";
   for (const ItemType& type : AllItemTypes()) {
     const std::string name = LowerCase(type.name);
     if (name.find(lower) != std::string::npos || lower.find(name) != std::string::npos)
       near += fmt::format("{}{} ({})", near.empty() ? "" : ", ", type.name, type.code);
   }
   return near.empty() ? "such as Elevation (100180)" : near;
+}
+
+}  // namespace
+
+namespace {
+
+/// Why the words do not begin with a command, or with one of a family; empty where they do.
+std::string WhyNoCommand(const CLI::App& app, std::span<const std::string> words) {
+  const std::vector<const CLI::App*> commands = app.get_subcommands([](const CLI::App*) { return true; });
+  if (commands.empty() || words.empty() || words.front().starts_with('-')) return {};
+  std::vector<std::string> names;
+  for (const CLI::App* command : commands) {
+    if (command->get_name() == words.front()) return WhyNoCommand(*command, words.subspan(1));
+    names.push_back(command->get_name());
+  }
+  const std::string family = app.get_parent() ? app.get_name() + " " : std::string();
+  return fmt::format("there is no command {}{}{} (tervane {}--help lists all)", family, words.front(),
+                     Suggestion(words.front(), names), family);
 }
 
 }  // namespace
@@ -54,7 +80,8 @@ CLI::Option* AddQuantity(CLI::App* command, int& itemType) {
       "The quantity, by its code or name: 100431, \"Precipitation Rate\"");
 }
 
-int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out, std::ostream& err) {
+int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& plainOut, std::ostream& plainErr) {
+  PrintableStream out(plainOut), err(plainErr);
   CLI::App app{"Checks, shows and changes setups of the integrated catchment model Tervane.", "tervane"};
   app.footer(
       "A PATH is section names joined by /, with #n behind a name for the n-th of equal names and :KEY for a key:\n"
@@ -66,15 +93,21 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out,
   CommandOffers offers(app, {out, err}, status);
   for (const auto& offer : kFiles) offer(offers);
 
+  if (const std::string why = WhyNoCommand(app, arguments); !why.empty()) return Refuse({out, err}, why);
   try {
     // CLI11 takes the arguments from the back.
     std::vector<std::string> reversed(arguments.rbegin(), arguments.rend());
     app.parse(reversed);
   } catch (const CLI::ParseError& error) {
     return app.exit(error, out, err) == 0 ? kDone : kCouldNot;
+  } catch (const std::bad_alloc&) {
+    err << "there is not enough memory for this: close other programs, or use a smaller file\n";
+    return kCouldNot;
   }
   out.flush();
   if (!out) {
+    // Who reads has what it wants.
+    if (os::IsOutputClosed()) return status;
     err << "the results could not be written\n";
     return kCouldNot;
   }

@@ -1,6 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <algorithm>
+#include <cmath>
 #include <vector>
 
 #include <fmt/format.h>
@@ -28,8 +29,10 @@ std::size_t WidthOf(const std::string& text) {
 }
 
 /// Cells below each other, the first row as heads.
-void WriteTable(const Rows& rows, std::ostream& out) {
+void WriteTable(Rows rows, std::ostream& out) {
   std::vector<std::size_t> widths;
+  for (auto& row : rows)
+    for (std::string& cell : row) cell = OneLine(cell);
   for (const auto& row : rows) {
     widths.resize(std::max(widths.size(), row.size()), 0);
     for (std::size_t i = 0; i < row.size(); ++i) widths[i] = std::max(widths[i], WidthOf(row[i]));
@@ -67,8 +70,8 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
   if (!board.rows.empty()) WriteTable(rows, out);
   for (const CoverageRow& row : board.rows)
     for (const Finding& remark : row.remarks)
-      fmt::print(out, "{}: {}: {}{}\n", NameOf(remark.severity), row.file.path, remark.text,
-                 remark.detail.empty() ? "" : fmt::format(" ({})", remark.detail));
+      fmt::print(out, "{}: {}: {}{}\n", NameOf(remark.severity), OneLine(row.file.path), OneLine(remark.text),
+                 remark.detail.empty() ? "" : fmt::format(" ({})", OneLine(remark.detail)));
   for (const ForcingTotals& totals : board.forcings) {
     fmt::print(out, "\n{}: {}; in brackets shares of domain and time\n", totals.forcing.path, totals.Heading());
     Rows table{{"station"}};
@@ -81,8 +84,9 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
     }
     WriteTable(table, out);
     for (const ForcingTotals::Column& column : totals.columns)
-      if (!column.problem.empty()) fmt::print(out, "error: {}: {}\n", column.name, column.problem);
-    for (const Finding& remark : totals.remarks) fmt::print(out, "{}: {}\n", NameOf(remark.severity), remark.text);
+      if (!column.problem.empty()) fmt::print(out, "error: {}: {}\n", OneLine(column.name), OneLine(column.problem));
+    for (const Finding& remark : totals.remarks)
+      fmt::print(out, "{}: {}\n", NameOf(remark.severity), OneLine(remark.text));
   }
 }
 
@@ -136,7 +140,8 @@ std::string JsonTotals(const ForcingTotals& totals, const std::vector<TotalsPeri
   for (const ForcingTotals::Column& column : totals.columns) {
     std::vector<std::string> values;
     for (std::size_t i = 0; i < column.sums.size(); ++i) {
-      const bool isKnown = column.sums[i].covered > 0;
+      // JSON knows no number that is none.
+      const bool isKnown = column.sums[i].covered > 0 && std::isfinite(totals.form.Of(column.sums[i]));
       values.push_back(JsonObject({{"period", JsonQuoted(periods[i].name)},
                                    {"value", isKnown ? ShortestNumber(totals.form.Of(column.sums[i])) : ""},
                                    {"secondsCovered", std::to_string(column.sums[i].covered)},

@@ -185,10 +185,14 @@ int PrintShapes(const std::string& path, bool json, Streams streams) {
     fmt::print(streams.err, "{}\n", facts->error);
     return kCouldNot;
   }
-  if (!facts->note.empty()) fmt::print(streams.err, "{}: note: {}\n", path, facts->note);
+  // The files beside it stand in the same folder, which is told once.
+  const auto note = [&](const std::string& text) {
+    const std::string folder(FolderOf(path));
+    fmt::print(streams.err, "{}: note: {}\n", path, folder.empty() ? text : Replaced(text, folder + "/", ""));
+  };
+  if (!facts->note.empty()) note(facts->note);
   // A damaged table is told by the note already.
-  if (facts->note.find(facts->tableProblem) == std::string::npos)
-    fmt::print(streams.err, "{}: note: {}\n", path, facts->tableProblem);
+  if (facts->note.find(facts->tableProblem) == std::string::npos) note(facts->tableProblem);
   constexpr std::string_view kKinds[] = {"points", "lines", "polygons", "points"};
   constexpr std::string_view kFields[] = {"text", "whole number", "real number"};
   const std::string_view kind = kKinds[static_cast<std::size_t>(facts->kind)];
@@ -232,13 +236,32 @@ int DataInfoCommand(const std::string& path, bool json, Streams streams) {
   return kDone;
 }
 
-int DataStatsCommand(const std::string& path, Streams streams) {
+std::string JsonSummary(const ValueSummary& summary) {
+  const bool hasValues = summary.count > 0;
+  return JsonObject({{"smallest", hasValues ? ShortestNumber(summary.smallest) : ""},
+                     {"largest", hasValues ? ShortestNumber(summary.largest) : ""},
+                     {"mean", hasValues ? ShortestNumber(summary.Mean()) : ""},
+                     {"values", std::to_string(summary.count)},
+                     {"missing", std::to_string(summary.missing)}});
+}
+
+std::string JsonStats(const DataItem& item, const ValueSummary& all, const std::vector<ValueSummary>& steps) {
+  std::vector<std::string> each;
+  for (const ValueSummary& step : steps) each.push_back(JsonSummary(step));
+  return JsonObject({{"name", JsonQuoted(item.name)},
+                     {"unit", JsonQuoted(item.unitText)},
+                     {"all", JsonSummary(all)},
+                     {"steps", item.hasTime && item.dimensions > 0 ? JsonArray(each) : ""}});
+}
+
+int DataStatsCommand(const std::string& path, bool json, Streams streams) {
   /// Of a file with more steps, only the whole is told.
   constexpr std::size_t kMostStepsTold = 24;
-  if (HasExtension(path, {".txt", ".xyz"})) return PrintPoints(path, false, streams);
-  if (HasExtension(path, {".shp"})) return PrintShapes(path, false, streams);
+  if (HasExtension(path, {".txt", ".xyz"})) return PrintPoints(path, json, streams);
+  if (HasExtension(path, {".shp"})) return PrintShapes(path, json, streams);
   DataFile file;
   if (!OpenDataFile(file, path, streams)) return kCouldNot;
+  std::vector<std::string> items;
   for (std::size_t i = 0; i < file.Items().size(); ++i) {
     const DataItem& item = file.Items()[i];
     std::vector<ValueSummary> steps;
@@ -254,6 +277,10 @@ int DataStatsCommand(const std::string& path, Streams streams) {
     }
     ValueSummary all;
     for (const ValueSummary& step : steps) all.Add(step);
+    if (json) {
+      items.push_back(JsonStats(item, all, steps));
+      continue;
+    }
     WriteSummary(fmt::format("item {}: {} [{}]", i + 1, item.name, item.unitText), all, streams.out);
     if (steps.size() < 2 || steps.size() > kMostStepsTold) continue;
     for (std::size_t step = 0; step < steps.size(); ++step) {
@@ -261,6 +288,7 @@ int DataStatsCommand(const std::string& path, Streams streams) {
       WriteSummary(fmt::format("  step {}{}", step + 1, date), steps[step], streams.out);
     }
   }
+  if (json) fmt::print(streams.out, "{}\n", JsonObject({{"items", JsonArray(items)}}));
   return kDone;
 }
 
@@ -280,9 +308,11 @@ void OfferDataCommands(CommandOffers& offers) {
       [offers, options] { return DataInfoCommand(options->file, options->json, offers.Output()); }, data);
   CLI::App* stats = offers.Command(
       "stats", "Tell range, mean and missing values of each item",
-      [offers, options] { return DataStatsCommand(options->file, offers.Output()); }, data);
-  for (CLI::App* command : {info, stats}) command->add_option("FILE", options->file, "The data file")->required();
-  info->add_flag("--json", options->json, "As JSON");
+      [offers, options] { return DataStatsCommand(options->file, options->json, offers.Output()); }, data);
+  for (CLI::App* command : {info, stats}) {
+    command->add_option("FILE", options->file, "The data file")->required();
+    command->add_flag("--json", options->json, "As JSON");
+  }
 }
 
 }  // namespace tervane

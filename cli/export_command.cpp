@@ -1,6 +1,9 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <algorithm>
+#include <map>
 #include <new>
+#include <optional>
 #include <vector>
 
 #include <fmt/format.h>
@@ -22,15 +25,27 @@ struct Export {
   std::string in, out;
   int item = 1, step = 1, layer = 1;  ///< Of grids.
   bool isPartNamed = false;           ///< One of them was given.
+  std::optional<CsvStamps> stamps;    ///< Of series; ends without it.
   bool force = false;
 };
 
 FileResult Failed(std::string error) { return {std::move(error), {}}; }
 
-FileResult WriteTable(const DataFile& file, const std::string& out) {
+FileResult WriteTable(const DataFile& file, const Export& wanted) {
   std::string text;
-  if (std::string error = WriteCsvSeries(file, text); !error.empty()) return Failed(std::move(error));
-  return WriteFileAtomically(out, text);
+  if (std::string error = WriteCsvSeries(file, wanted.stamps.value_or(CsvStamps::Ends), text); !error.empty())
+    return Failed(std::move(error));
+  return WriteFileAtomically(wanted.out, text);
+}
+
+/// What the dates of the table are: who reads it must know.
+std::string StampsText(const DataFile& file, const Export& wanted) {
+  if (wanted.stamps == CsvStamps::Begins) return "each date is the begin of its interval";
+  const bool holdAtDates = std::ranges::all_of(
+      file.Items(), [](const DataItem& item) { return item.valueType == ValueType::Instantaneous; });
+  if (holdAtDates) return "each value holds at its date";
+  return wanted.stamps ? "each date is the end of its interval"
+                       : "each date is the end of its interval; --stamps begin writes the begins";
 }
 
 /// Writes one step of one layer, in the file's unit.
@@ -56,15 +71,18 @@ int ExportCommand(const Export& wanted, Streams streams) {
   const bool isRaster = EqualIgnoringCase(extension, ".tif") || EqualIgnoringCase(extension, ".tiff");
   if (!isRaster && wanted.isPartNamed)
     return Refuse(streams, "--item, --step and --layer choose a grid for a GeoTIFF: give OUT the extension .tif");
+  if (isRaster && wanted.stamps)
+    return Refuse(streams, "--stamps tells what the dates of a table are: a GeoTIFF has none");
   if (RefuseToReplace(wanted.out, wanted.force, streams)) return kCouldNot;
   FileResult written;
   try {
-    written = isRaster ? WriteRaster(file, wanted) : WriteTable(file, wanted.out);
+    written = isRaster ? WriteRaster(file, wanted) : WriteTable(file, wanted);
   } catch (const std::bad_alloc&) {
     written = Failed(fmt::format("cannot read {}: it needs more than the free memory", wanted.in));
   }
   if (!written.Ok()) return Refuse(streams, written.error);
   if (!written.note.empty()) fmt::print(streams.err, "{}: {}\n", wanted.out, written.note);
+  if (!isRaster) fmt::print(streams.out, "{}: {} steps, {}\n", wanted.out, file.Time().steps, StampsText(file, wanted));
   return kDone;
 }
 
@@ -85,6 +103,9 @@ void OfferExportCommand(CommandOffers& offers) {
       options->isPartNamed = true;
     });
   }
+  const std::map<std::string, CsvStamps> places{{"begin", CsvStamps::Begins}, {"end", CsvStamps::Ends}};
+  exporting->add_option("--stamps", options->stamps, "Which end of its interval a date of a table is; end without it")
+      ->transform(CLI::CheckedTransformer(places));
   exporting->add_flag("--force", options->force, "Replace a file that exists");
 }
 

@@ -6,12 +6,27 @@
 #include "cli/offers.h"
 #include "cli/setup_file.h"
 #include "platform/files.h"
+#include "platform/paths.h"
+#include "platform/text.h"
 
 namespace tervane {
 
 int Refuse(Streams streams, const std::string& reason) {
   fmt::print(streams.err, "{}\n", reason);
   return kCouldNot;
+}
+
+std::string Suggestion(const std::string& typed, const std::vector<std::string>& names) {
+  const std::string* nearest = nullptr;
+  std::size_t least = typed.size() / 3 + 2;
+  for (const std::string& name : names) {
+    if (EqualIgnoringCase(name, typed)) return fmt::format("; did you mean {}?", name);
+    const std::size_t distance = EditDistance(name, typed);
+    if (distance >= least) continue;
+    least = distance;
+    nearest = &name;
+  }
+  return nearest ? fmt::format("; did you mean {}?", *nearest) : std::string();
 }
 
 bool RefuseToReplace(const std::string& file, bool force, Streams streams) {
@@ -38,17 +53,23 @@ int Save(CFlowModelDoc& document, const std::string& file, Streams streams) {
 }
 
 int NewCommand(const std::string& file, bool force, Streams streams) {
+  if (!force && !EqualIgnoringCase(ExtensionOf(file), ".tvd"))
+    return Refuse(streams, fmt::format("{}: a setup is named NAME.tvd; add --force to write it all the same", file));
   if (RefuseToReplace(file, force, streams)) return kCouldNot;
+  SetupLock lock;
+  if (!HoldSetup(lock, file, force, streams)) return kCouldNot;
   CFlowModelDoc document;
   return Save(document, file, streams);
 }
 
 int ConvertCommand(const std::string& in, const std::string& out, bool force, Streams streams) {
-  CFlowModelDoc document;
-  if (!OpenSetup(document, in, streams)) return kCouldNot;
   // Converting a file in its place keeps the original beside it.
   const bool isInPlace = in == out || IsSameFile(in, out);
-  if (isInPlace ? RefuseHeld(out, force, streams) : RefuseToReplace(out, force, streams)) return kCouldNot;
+  if (!isInPlace && RefuseToReplace(out, force, streams)) return kCouldNot;
+  SetupLock lock;
+  if (!HoldSetup(lock, out, force, streams)) return kCouldNot;
+  CFlowModelDoc document;
+  if (!OpenSetup(document, in, streams)) return kCouldNot;
   PrintLoadReport(document, streams);
   return Save(document, out, streams);
 }
@@ -61,7 +82,8 @@ void OfferFileCommands(CommandOffers& offers) {
     return NewCommand(options->file, options->force, offers.Output());
   });
   AddSetup(create, options->file);
-  create->add_flag("--force", options->force, "Replace a file that exists, also where an editor has it open");
+  create->add_flag("--force", options->force,
+                   "Replace a file that exists, also where an editor has it open; write under a name without .tvd");
 }
 
 void OfferConvertCommand(CommandOffers& offers) {

@@ -7,6 +7,9 @@
 #include "cli/setup_file.h"
 #include "data/grid_files.h"
 #include "data/raster_import.h"
+#include "geometry/xyz_text.h"
+#include "platform/paths.h"
+#include "platform/text.h"
 #include "spatial/domain.h"
 
 namespace tervane {
@@ -38,6 +41,19 @@ bool FindModelGrid(const std::string& setup, GridGeometry& geometry, Streams str
   return result.Ok();
 }
 
+/// Why a file could not be imported. Texts of scattered points are no rasters, and what is wrong with them is better
+/// told by who reads such points.
+std::string WhyNoRaster(const std::string& path, const std::string& error) {
+  const std::string extension = LowerCase(ExtensionOf(path));
+  if (extension != ".xyz" && extension != ".txt") return error;
+  const auto facts = XyzFactsOf(path);
+  if (!facts->error.empty()) return facts->error;
+  return fmt::format(
+      "{}: its {} points stand on no regular grid: name the file as \"Point XYZ(.txt)\" of a quantity, "
+      "which interpolates between them ({})",
+      path, facts->points, error);
+}
+
 int ImportGridCommand(const GridImport& import, Streams streams) {
   RasterImport wanted;
   wanted.itemType = import.itemType;
@@ -53,7 +69,7 @@ int ImportGridCommand(const GridImport& import, Streams streams) {
   const RasterImportReport report = ImportRaster(import.in, wanted, grid);
   for (const std::string& note : report.notes) fmt::print(streams.err, "{}: note: {}\n", import.in, note);
   for (const std::string& warning : report.warnings) fmt::print(streams.err, "{}: warning: {}\n", import.in, warning);
-  if (!report.Ok()) return Refuse(streams, report.error);
+  if (!report.Ok()) return Refuse(streams, WhyNoRaster(import.in, report.error));
   const FileResult written = WriteGridData(import.out, grid);
   if (!written.Ok()) return Refuse(streams, written.error);
   if (!written.note.empty()) fmt::print(streams.err, "{}: {}\n", import.out, written.note);

@@ -2,29 +2,43 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "cli/json.h"
 
+#include <algorithm>
+
 #include <fmt/format.h>
+
+#include "platform/text.h"
 
 namespace tervane {
 
+namespace {
+
+/// Bytes of the character at the text's start; 0 where its first byte begins none.
+std::size_t CharacterLength(std::string_view text) {
+  for (std::size_t length = 1; length <= std::min<std::size_t>(text.size(), 4); ++length)
+    if (!FirstInvalidUtf8(text.substr(0, length))) return length;
+  return 0;
+}
+
+}  // namespace
+
 std::string JsonQuoted(std::string_view text) {
   std::string json = "\"";
-  for (const char c : text) {
-    switch (c) {
-      case '"':
-        json += "\\\"";
-        break;
-      case '\\':
-        json += "\\\\";
-        break;
-      case '\n':
-        json += "\\n";
-        break;
-      default:
-        if (static_cast<unsigned char>(c) < 0x20)
-          json += fmt::format("\\u{:04x}", static_cast<unsigned char>(c));
-        else
-          json += c;
-    }
+  while (!text.empty()) {
+    const std::size_t length = CharacterLength(text);
+    const auto byte = static_cast<unsigned char>(text[0]);
+    const bool isHighControl = length == 2 && byte == 0xC2 && static_cast<unsigned char>(text[1]) < 0xA0;
+    if (byte == '"' || byte == '\\')
+      json += fmt::format("\\{}", text[0]);
+    else if (byte == '\n')
+      json += "\\n";
+    else if (byte < 0x20 || byte == 0x7F || length == 0)
+      // A byte that is no UTF-8 is told by its number.
+      json += fmt::format("\\u{:04x}", byte);
+    else if (isHighControl)
+      json += fmt::format("\\u{:04x}", static_cast<unsigned char>(text[1]));
+    else
+      json += text.substr(0, length);
+    text.remove_prefix(std::max<std::size_t>(length, 1));
   }
   return json += '"';
 }

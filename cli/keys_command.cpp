@@ -1,8 +1,11 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <cmath>
+
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
+#include "cli/json.h"
 #include "cli/offers.h"
 #include "core/doc_version.h"
 #include "core/list.h"
@@ -12,6 +15,10 @@
 namespace tervane {
 
 namespace {
+
+struct KeysOptions {
+  bool markdown = false, json = false;
+};
 
 /// The versions of documents in which a key is read, where there is a limit.
 std::string Versions(const KeyInfo& key) {
@@ -51,9 +58,38 @@ void WriteText(const KeySection& section, std::ostream& out) {
                Versions(key), Facts(key));
 }
 
-int KeysCommand(bool markdown, Streams streams) {
+std::string Json(const KeySection& section, const KeyInfo& key) {
+  const auto version = [](int number, int none) { return number == none ? std::string() : std::to_string(number); };
+  const auto optional = [](std::string_view text) { return text.empty() ? std::string() : JsonQuoted(text); };
+  const auto limit = [](double number) { return std::isfinite(number) ? ShortestNumber(number) : std::string(); };
+  std::vector<std::string> choices;
+  for (const KeyChoice& choice : key.facts.choices)
+    choices.push_back(
+        JsonObject({{"value", std::to_string(choice.value + key.inFile)}, {"text", JsonQuoted(choice.text)}}));
+  return JsonObject({{"path", JsonQuoted(section.path)},
+                     {"key", JsonQuoted(Trimmed(key.key))},
+                     {"class", JsonQuoted(section.className)},
+                     {"type", JsonQuoted(key.type)},
+                     {"default", optional(key.defaultValue)},
+                     {"since", key.since > 0 ? version(key.since, KeyInfo::kNoLimit) : ""},
+                     {"until", version(key.until, KeyInfo::kNoLimit)},
+                     {"written", JsonBool(key.written)},
+                     {"choices", choices.empty() ? "" : JsonArray(choices)},
+                     {"unit", optional(key.facts.UnitText())},
+                     {"least", limit(key.facts.least)},
+                     {"greatest", limit(key.facts.greatest)}});
+}
+
+int KeysCommand(const KeysOptions& options, Streams streams) {
   const KeyReference reference;
-  if (markdown)
+  if (options.json) {
+    std::vector<std::string> keys;
+    for (const KeySection& section : reference.Sections())
+      for (const KeyInfo& key : section.keys) keys.push_back(Json(section, key));
+    fmt::print(streams.out, "{}\n", JsonObject({{"keys", JsonArray(keys)}}));
+    return kDone;
+  }
+  if (options.markdown)
     fmt::print(streams.out,
                "# Keys of a setup\n\nDocument version {}. Every section begins with `Touched` (int, whether its page "
                "was visited) and `IsDataUsedInSetup` (int, computed at every save).\n",
@@ -61,18 +97,18 @@ int KeysCommand(bool markdown, Streams streams) {
   else
     fmt::print(streams.out, "PLACE\tTYPE\tDEFAULT\tVERSIONS\tVALUES\n");
   for (const KeySection& section : reference.Sections())
-    markdown ? WriteMarkdown(section, streams.out) : WriteText(section, streams.out);
+    options.markdown ? WriteMarkdown(section, streams.out) : WriteText(section, streams.out);
   return kDone;
 }
 
 }  // namespace
 
 void OfferKeysCommand(CommandOffers& offers) {
-  auto markdown = std::make_shared<bool>(false);
-  offers
-      .Command("keys", "List all keys with place, type, default and values",
-               [offers, markdown] { return KeysCommand(*markdown, offers.Output()); })
-      ->add_flag("--markdown", *markdown, "As a page of the manual");
+  auto options = std::make_shared<KeysOptions>();
+  CLI::App* keys = offers.Command("keys", "List all keys with place, type, default and values",
+                                  [offers, options] { return KeysCommand(*options, offers.Output()); });
+  CLI::Option* markdown = keys->add_flag("--markdown", options->markdown, "As a page of the manual");
+  keys->add_flag("--json", options->json, "As JSON")->excludes(markdown);
 }
 
 }  // namespace tervane

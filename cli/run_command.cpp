@@ -49,7 +49,8 @@ class TerminalShell : public EngineShell {
  private:
   void Follow(SetupRun& run);
   void CopyLog(LogReader& log, LineCutter& cutter);
-  void Understand(const LogPiece& lines);
+  /// Passes lines of the engine on, and keeps its messages.
+  void Take(const LogPiece& lines);
   void Report(const SetupRun& run, const std::string& sentence);
 
   const CFlowModelDoc& document_;
@@ -94,21 +95,24 @@ void TerminalShell::Follow(SetupRun& run) {
     }
     std::this_thread::sleep_for(kInterval);
   }
-  Understand(cutter.Rest());
+  Take(cutter.Rest());
 }
 
 void TerminalShell::CopyLog(LogReader& log, LineCutter& cutter) {
-  std::ostream& to = options_.json ? streams_.err : streams_.out;
-  for (std::string bytes = log.Read(kBlock); !bytes.empty(); bytes = log.Read(kBlock)) {
-    to << bytes;
-    Understand(cutter.Cut(bytes));
-  }
-  to.flush();
+  for (std::string bytes = log.Read(kBlock); !bytes.empty(); bytes = log.Read(kBlock)) Take(cutter.Cut(bytes));
+  streams_.out.flush();
+  streams_.err.flush();
 }
 
-void TerminalShell::Understand(const LogPiece& lines) {
-  for (std::size_t i = 0; i < lines.Count() && messages_.size() < kMostMessages; ++i)
-    if (std::optional<EngineMessage> message = EngineMessageOf(lines.Line(i))) messages_.push_back(std::move(*message));
+void TerminalShell::Take(const LogPiece& lines) {
+  for (std::size_t i = 0; i < lines.Count(); ++i) {
+    const std::string_view line = lines.Line(i);
+    // How far it is, is no result.
+    const bool isResult = !options_.json && !EngineProgressOf(line);
+    (isResult ? streams_.out : streams_.err) << line << '\n';
+    if (messages_.size() >= kMostMessages) continue;
+    if (std::optional<EngineMessage> message = EngineMessageOf(line)) messages_.push_back(std::move(*message));
+  }
 }
 
 void TerminalShell::Report(const SetupRun& run, const std::string& sentence) {
@@ -153,8 +157,8 @@ void OfferRunCommand(CommandOffers& offers) {
                                   [offers, options] { return RunCommand(*options, offers.Output()); });
   AddSetup(runs, options->file);
   runs->footer(
-      "What the engine says goes to the output, how it ended to the error stream. Ctrl-C stops the engine. Exit "
-      "status:\n"
+      "What the engine says goes to the output, how far it is and how it ended to the error stream. Ctrl-C stops the\n"
+      "engine. Exit status:\n"
       "0 done, 1 the engine failed or was stopped, 2 not started.");
   const auto part = [&](const char* name, const char* argument, const char* description) {
     return runs->add_flag_callback(

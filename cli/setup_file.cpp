@@ -9,7 +9,6 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "document/setup_lock.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 
@@ -21,11 +20,24 @@ bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams
   return false;
 }
 
+namespace {
+
+void PrintHeld(const std::string& file, const std::string& reason, Streams streams) {
+  fmt::print(streams.err, "{}: {}; close it there, or add --force to write it all the same\n", file, reason);
+}
+
+}  // namespace
+
+bool HoldSetup(SetupLock& lock, const std::string& file, bool force, Streams streams) {
+  // Where no lock can be written, the setup cannot be saved either, and that save tells why.
+  const bool isHeld = lock.Take(file, SetupLock::Purpose::OneChange) == SetupLock::Outcome::Held;
+  if (isHeld && !force) PrintHeld(file, lock.Reason(), streams);
+  return !isHeld || force;
+}
+
 bool RefuseHeld(const std::string& file, bool force, Streams streams) {
   const std::optional<LockHolder> holder = force ? std::nullopt : HolderOf(file);
-  if (holder)
-    fmt::print(streams.err, "{}: {}; close it there, or add --force to write it all the same\n", file,
-               HolderSentence(*holder));
+  if (holder) PrintHeld(file, HolderSentence(*holder), streams);
   return holder.has_value();
 }
 
@@ -33,9 +45,9 @@ void PrintLoadReport(const CFlowModelDoc& document, Streams streams) {
   const LoadReport& report = document.Report();
   for (const LoadReport::Entry& entry : report.entries)
     fmt::print(streams.err, "{}:{}: {}{}{}: {}\n", document.PathName(), entry.line, entry.path,
-               entry.key.empty() ? "" : ":", entry.key, entry.text);
+               entry.key.empty() ? "" : ":", entry.key, OneLine(entry.text));
   for (const KvfUnread& unread : report.unread)
-    fmt::print(streams.err, "{}:{}: {}\n", document.PathName(), unread.line, unread.text);
+    fmt::print(streams.err, "{}:{}: {}\n", document.PathName(), unread.line, OneLine(unread.text));
 }
 
 void PrintLoadReportHint(const CFlowModelDoc& document, Streams streams) {
@@ -51,24 +63,6 @@ void ReadProcessedData(const CFlowModelDoc& document, Streams streams) {
   report->Load();
   if (!report->Problem().empty()) fmt::print(streams.err, "{}\n", report->Problem());
 }
-
-namespace {
-
-/// ", did you mean X?" for the name that comes nearest, or nothing.
-std::string Suggestion(const std::string& typed, const std::vector<std::string>& names) {
-  const std::string* nearest = nullptr;
-  std::size_t least = typed.size() / 3 + 2;
-  for (const std::string& name : names) {
-    if (EqualIgnoringCase(name, typed)) return fmt::format("; did you mean {}?", name);
-    const std::size_t distance = EditDistance(name, typed);
-    if (distance >= least) continue;
-    least = distance;
-    nearest = &name;
-  }
-  return nearest ? fmt::format("; did you mean {}?", *nearest) : std::string();
-}
-
-}  // namespace
 
 CYbSEKvfBase* FindNodeOrReport(CFlowModelDoc& document, const SetupPath& path, const std::string& typed,
                                Streams streams) {

@@ -7,13 +7,18 @@
 
 #include "cli/commands.h"
 #include "document/flow_model_document.h"
+#include "document/setup_lock.h"
 
 namespace tervane {
 
 /// Opens a setup; tells on the error stream why that failed.
 bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams);
 
-/// True, with a message, when an editor that runs has the setup open: its next save would undo what is written here.
+/// Takes the lock of a setup that is read, changed and written, so that no change of another program is lost; waits for
+/// other commands that do the same. False, with a message, when an editor that runs has the setup open: its next save
+/// would undo what is written here. With `force` it is then written all the same.
+bool HoldSetup(SetupLock& lock, const std::string& file, bool force, Streams streams);
+/// True, with a message, when an editor that runs has the file open.
 bool RefuseHeld(const std::string& file, bool force, Streams streams);
 
 /// Prints the notes on the loading to the error stream, a line each; for commands that write or compare.

@@ -9,6 +9,7 @@
 #include "core/kvf_writer.h"
 #include "core/list.h"
 #include "document/key_reference.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -37,11 +38,11 @@ int TreeCommand(const std::string& file, bool all, TreeForm form, Streams stream
                                    {"used", JsonBool(place.takesPart)}}));
         break;
       case TreeForm::Paths:
-        fmt::print(streams.out, "{}\n", place.path);
+        fmt::print(streams.out, "{}\n", OneLine(place.path));
         break;
       case TreeForm::Text:
         fmt::print(streams.out, "{:{}}{}  {}{}\n", "", 2 * (place.depth - 1), StepName(place.node),
-                   place.node.GetTitle(), place.takesPart ? "" : "  (takes no part)");
+                   OneLine(place.node.GetTitle()), place.takesPart ? "" : "  (takes no part)");
         break;
     }
   });
@@ -51,10 +52,10 @@ int TreeCommand(const std::string& file, bool all, TreeForm form, Streams stream
 
 /// The node's keys as they would be saved, with their defaults where they differ, and its findings.
 void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyReference& reference, Streams streams) {
-  fmt::print(streams.out, "{}  {} ({}){}\n", place.path, place.node.GetTitle(), ClassNameOf(place.node),
-             place.takesPart ? "" : ", takes no part");
+  fmt::print(streams.out, "{}  {} ({}){}\n", OneLine(place.path), OneLine(place.node.GetTitle()),
+             ClassNameOf(place.node), place.takesPart ? "" : ", takes no part");
   for (const Finding& finding : place.node.Findings())
-    fmt::print(streams.out, "  ! {}: {}\n", NameOf(finding.severity), finding.text);
+    fmt::print(streams.out, "  ! {}: {}\n", NameOf(finding.severity), OneLine(finding.text));
   const KvfSection* section = place.node.GetSectionName().empty() ? nullptr : written.SectionOf(place.node);
   for (const KvfNode* node = section ? section->firstChild : nullptr; node; node = node->next) {
     if (!node->IsKeyword()) continue;
@@ -67,20 +68,43 @@ void ShowNode(const NodePlace& place, const WrittenSetup& written, const KeyRefe
   }
 }
 
-int ShowCommand(const std::string& file, const std::string& typed, Streams streams) {
+/// The same in JSON.
+std::string JsonNode(const NodePlace& place, const WrittenSetup& written, const KeyReference& reference) {
+  std::vector<std::string> findings, keys;
+  for (const Finding& finding : place.node.Findings())
+    findings.push_back(JsonObject({{"severity", JsonQuoted(NameOf(finding.severity))},
+                                   {"text", JsonQuoted(finding.text)},
+                                   {"key", finding.key.empty() ? "" : JsonQuoted(finding.key)},
+                                   {"detail", finding.detail.empty() ? "" : JsonQuoted(finding.detail)}}));
+  const KvfSection* section = place.node.GetSectionName().empty() ? nullptr : written.SectionOf(place.node);
+  for (const KvfNode* node = section ? section->firstChild : nullptr; node; node = node->next)
+    if (node->IsKeyword()) keys.push_back(JsonKey(*node, place.path, reference));
+  return JsonObject({{"path", JsonQuoted(place.path)},
+                     {"class", JsonQuoted(ClassNameOf(place.node))},
+                     {"title", JsonQuoted(place.node.GetTitle())},
+                     {"used", JsonBool(place.takesPart)},
+                     {"findings", JsonArray(findings)},
+                     {"keys", JsonArray(keys)}});
+}
+
+int ShowCommand(const std::string& file, const std::string& typed, bool json, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   PrintLoadReportHint(document, streams);
   const SetupPath path = ParseSetupPath(typed);
   const CYbSEKvfBase* wanted = FindNodeOrReport(document, path, typed, streams);
   if (!wanted) return kCouldNot;
-  if (!path.key.name.empty()) return GetCommand(file, typed, streams);
+  if (!path.key.name.empty()) return GetCommand(file, typed, json, streams);
   const WrittenSetup written(document);
   const KeyReference reference;
+  std::vector<std::string> nodes;
   WalkNodes(document.Root(), [&](const NodePlace& place) {
-    for (const CYbSEKvfBase* node = &place.node; node; node = node->GetParent())
-      if (node == wanted) return ShowNode(place, written, reference, streams);
+    const CYbSEKvfBase* node = &place.node;
+    while (node && node != wanted) node = node->GetParent();
+    if (!node) return;
+    json ? nodes.push_back(JsonNode(place, written, reference)) : ShowNode(place, written, reference, streams);
   });
+  if (json) fmt::print(streams.out, "{}\n", JsonObject({{"nodes", JsonArray(nodes)}}));
   return kDone;
 }
 
@@ -98,10 +122,11 @@ void OfferTreeCommands(CommandOffers& offers) {
   tree->add_flag("--json", options->json, "As JSON");
 
   CLI::App* show = offers.Command("show", "Show nodes with their keys, as they would be saved", [offers, options] {
-    return ShowCommand(options->file, options->path, offers.Output());
+    return ShowCommand(options->file, options->path, options->json, offers.Output());
   });
   AddSetup(show, options->file);
   show->add_option("PATH", options->path, "The node; without it the whole setup");
+  show->add_flag("--json", options->json, "As JSON");
 }
 
 }  // namespace tervane

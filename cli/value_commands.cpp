@@ -1,20 +1,23 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include <charconv>
-#include <optional>
+#include <cmath>
+#include <memory>
 #include <vector>
 
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
+#include "cli/json.h"
 #include "cli/offers.h"
 #include "cli/setup_file.h"
+#include "cli/typed_value.h"
 #include "core/kvf_writer.h"
+#include "document/key_reference.h"
 #include "platform/text.h"
 
 namespace tervane {
 
-int GetCommand(const std::string& file, const std::string& typed, Streams streams) {
+int GetCommand(const std::string& file, const std::string& typed, bool json, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   PrintLoadReportHint(document, streams);
@@ -25,7 +28,10 @@ int GetCommand(const std::string& file, const std::string& typed, Streams stream
   KvfSection* section = written.SectionOf(*node);
   const KvfNode* key = section ? FindKeyOrReport(*section, path.key, typed, streams) : nullptr;
   if (!key) return kCouldNot;
-  fmt::print(streams.out, "{}\n", PlainValuesText(*key));
+  if (json)
+    fmt::print(streams.out, "{}\n", JsonKey(*key, PathOf(*node), KeyReference()));
+  else
+    fmt::print(streams.out, "{}\n", PlainValuesText(*key));
   return kDone;
 }
 
@@ -33,121 +39,138 @@ namespace {
 
 struct ValueOptions {
   std::string file, path, value;
-  bool force = false;
+  std::vector<std::string> more;  ///< Further keys, each with its value behind it.
+  bool force = false, json = false;
 };
 
-template <class Number>
-bool ReadNumber(std::string_view text, Number& number) {
-  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number);
-  return error == std::errc() && end == text.data() + text.size() && !text.empty();
-}
+/// One key and what it is to hold.
+struct Change {
+  std::string path, value;
+};
 
-/// Takes a typed value in the type that the key has; gives what was expected when it is none.
-std::string TakeValue(std::string_view text, KvfFile& file, KvfParam& param) {
-  switch (param.type) {
-    case KvfType::Int:
-      return ReadNumber(text, param.asInt) ? "" : "a whole number from -2147483648 to 2147483647";
-    case KvfType::Float:
-      if (text.ends_with('f') && !text.ends_with("inf")) text.remove_suffix(1);
-      return ReadNumber(text, param.asFloat) ? "" : "a number that fits a float";
-    case KvfType::Double:
-      return ReadNumber(text, param.asDouble) ? "" : "a number";
-    case KvfType::Bool:
-      param.asBool = text == "true";
-      return text == "true" || text == "false" ? "" : "true or false";
-    case KvfType::String:
-    case KvfType::Filename:
-      if (FirstInvalidUtf8(text)) return "a text in UTF-8";
-      file.SetText(param, text);
-      return "";
-  }
-  return "";
-}
-
-/// The parts of a typed value: as many as the key has values. A date may be typed as 2000-01-31 12:00.
-std::vector<std::string_view> SplitValue(std::string_view value, std::uint32_t count) {
-  std::vector<std::string_view> parts;
-  if (count == 1) return {value};
-  const std::string_view separators = value.find(',') != std::string_view::npos ? "," : "-T: ";
-  while (true) {
-    const std::size_t end = value.find_first_of(separators);
-    parts.push_back(Trimmed(value.substr(0, end)));
-    if (end == std::string_view::npos) return parts;
-    value.remove_prefix(end + 1);
-  }
-}
-
-std::string TakeValues(std::string_view value, KvfFile& file, KvfNode& key) {
-  const std::vector<std::string_view> parts = SplitValue(value, key.count);
-  if (parts.size() != key.count) return fmt::format("{} values separated by commas", key.count);
-  for (std::uint32_t i = 0; i < key.count; ++i)
-    if (std::string expected = TakeValue(parts[i], file, key.params[i]); !expected.empty()) return expected;
-  return {};
-}
-
-int SetCommand(const std::string& file, const std::string& typed, const std::string& value, bool force,
-               Streams streams) {
-  if (RefuseHeld(file, force, streams)) return kCouldNot;
-  CFlowModelDoc document;
-  if (!OpenSetup(document, file, streams)) return kCouldNot;
-  PrintLoadReport(document, streams);
-  const SetupPath path = ParseSetupPath(typed);
-  const CYbSEKvfBase* node = FindNodeOrReport(document, path, typed, streams);
-  if (!node) return kCouldNot;
+/// The setup with a change; null, with a message, when it is refused.
+std::unique_ptr<CFlowModelDoc> Changed(CFlowModelDoc& document, const Change& change, const KeyReference& reference,
+                                       Streams streams) {
+  const auto refuse = [&](std::string_view why) {
+    fmt::print(streams.err, "{} = {}: {}\n", change.path, change.value, why);
+    return nullptr;
+  };
+  const SetupPath path = ParseSetupPath(change.path);
+  const CYbSEKvfBase* node = FindNodeOrReport(document, path, change.path, streams);
+  if (!node) return nullptr;
 
   // The value is put where the file would hold it, and that file is read as any other: so a key means here what it
   // means to the nodes.
   const WrittenSetup written(document);
   KvfSection* section = written.SectionOf(*node);
-  KvfNode* key = section ? FindKeyOrReport(*section, path.key, typed, streams) : nullptr;
-  if (!key) return kCouldNot;
-  if (const std::string expected = TakeValues(value, written.File(), *key); !expected.empty()) {
-    fmt::print(streams.err, "{} = {}: {} was expected\n", typed, value, expected);
-    return kCouldNot;
-  }
+  KvfNode* key = section ? FindKeyOrReport(*section, path.key, change.path, streams) : nullptr;
+  if (!key) return nullptr;
+  const KeyInfo* info = reference.KeyOf(PathOf(*node), Trimmed(path.key.name));
+  if (const std::string expected = TakeTyped(change.value, info, *section, *key); !expected.empty())
+    return refuse(expected + " was expected");
   const std::string wanted = KvfValuesText(*key);
   std::string text, error;
-  CFlowModelDoc changed;
-  if (!WriteKvfText(written.File(), text, error) || !changed.OpenText(text, file)) {
-    fmt::print(streams.err, "{} = {}: {}\n", typed, value, error.empty() ? changed.Error() : error);
-    return kCouldNot;
-  }
-  const WrittenSetup result(changed);
-  const CYbSEKvfBase* changedNode = FindNode(changed.Root(), path.steps);
+  auto changed = std::make_unique<CFlowModelDoc>();
+  if (!WriteKvfText(written.File(), text, error)) return refuse(error);
+  if (!changed->OpenText(text, document.PathName())) return refuse(changed->Error());
+  const WrittenSetup result(*changed);
+  const CYbSEKvfBase* changedNode = FindNode(changed->Root(), path.steps);
   KvfSection* changedSection = changedNode ? result.SectionOf(*changedNode) : nullptr;
   const KvfNode* taken = changedSection ? FindKvfNode(*changedSection, true, Trimmed(path.key.name),
                                                       static_cast<std::size_t>(path.key.instance))
                                         : nullptr;
-  if (!taken || KvfValuesText(*taken) != wanted) {
-    fmt::print(streams.err, "{} = {}: the setup does not take this value: it would be saved as {}\n", typed, value,
-               taken ? PlainValuesText(*taken) : "nothing");
-    return kCouldNot;
+  if (!taken || KvfValuesText(*taken) != wanted)
+    return refuse(fmt::format("the setup does not take this value: it would be saved as {}",
+                              taken ? PlainValuesText(*taken) : "nothing"));
+  changed->Continue(document);
+  return changed;
+}
+
+/// What the setup finds of a key that was changed.
+void PrintFindings(const CFlowModelDoc& document, const Change& change, Streams streams) {
+  const SetupPath path = ParseSetupPath(change.path);
+  const CYbSEKvfBase* node = FindNode(document.Root(), path.steps);
+  if (!node) return;
+  for (const Finding& finding : node->Findings())
+    if (finding.key == Trimmed(path.key.name))
+      fmt::print(streams.err, "{}: {}: {}{}\n", change.path, NameOf(finding.severity), OneLine(finding.text),
+                 finding.detail.empty() ? std::string() : fmt::format(" ({})", OneLine(finding.detail)));
+}
+
+int SetCommand(const std::string& file, const std::vector<Change>& changes, bool force, Streams streams) {
+  SetupLock lock;
+  if (!HoldSetup(lock, file, force, streams)) return kCouldNot;
+  auto document = std::make_unique<CFlowModelDoc>();
+  if (!OpenSetup(*document, file, streams)) return kCouldNot;
+  PrintLoadReport(*document, streams);
+  const KeyReference reference;
+  for (const Change& change : changes) {
+    document = Changed(*document, change, reference, streams);
+    if (!document) return kCouldNot;
   }
-  changed.Continue(document);
-  if (!changed.OnSaveDocument(file)) {
-    fmt::print(streams.err, "{}\n", changed.Error());
-    return kCouldNot;
-  }
-  for (const std::string& note : changed.SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
+  if (!document->OnSaveDocument(file)) return Refuse(streams, document->Error());
+  for (const std::string& note : document->SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
+  for (const Change& change : changes) PrintFindings(*document, change, streams);
   return kDone;
+}
+
+std::string JsonValue(const KvfParam& param) {
+  switch (param.type) {
+    case KvfType::Int:
+      return std::to_string(param.asInt);
+    case KvfType::Float:
+      // JSON knows no number that is none.
+      return std::isfinite(param.asFloat) ? ShortestNumber(param.asFloat) : JsonQuoted(ShortestNumber(param.asFloat));
+    case KvfType::Double:
+      return std::isfinite(param.asDouble) ? ShortestNumber(param.asDouble)
+                                           : JsonQuoted(ShortestNumber(param.asDouble));
+    case KvfType::Bool:
+      return JsonBool(param.asBool);
+    default:
+      return JsonQuoted(param.Text());
+  }
 }
 
 }  // namespace
 
+std::string JsonKey(const KvfNode& keyword, std::string_view sectionPath, const KeyReference& reference) {
+  std::vector<std::string> values;
+  for (std::uint32_t i = 0; i < keyword.count; ++i) values.push_back(JsonValue(keyword.params[i]));
+  const auto optional = [](std::string_view text) { return text.empty() ? std::string() : JsonQuoted(text); };
+  const KeyInfo* info = reference.KeyOf(sectionPath, keyword.Name());
+  const bool hasChoices = info && !info->facts.choices.empty();
+  const std::string_view meaning = reference.MeaningOf(sectionPath, keyword.Name(), KvfValuesText(keyword));
+  return JsonObject({{"key", JsonQuoted(keyword.Name())},
+                     {"values", JsonArray(values)},
+                     {"text", hasChoices ? optional(meaning) : ""},
+                     {"unit", hasChoices ? "" : optional(meaning)},
+                     {"default", optional(reference.DefaultOf(sectionPath, keyword.Name()))}});
+}
+
 void OfferValueCommands(CommandOffers& offers) {
   auto options = std::make_shared<ValueOptions>();
   CLI::App* get = offers.Command("get", "Print the value of a key, as it would be saved", [offers, options] {
-    return GetCommand(options->file, options->path, offers.Output());
+    return GetCommand(options->file, options->path, options->json, offers.Output());
   });
-  CLI::App* set = offers.Command("set", "Change the value of a key and save the setup", [offers, options] {
-    return SetCommand(options->file, options->path, options->value, options->force, offers.Output());
+  CLI::App* set = offers.Command("set", "Change the values of keys and save the setup", [offers, options] {
+    if (options->more.size() % 2 != 0)
+      return Refuse(offers.Output(), fmt::format("{}: a value was expected behind this key", options->more.back()));
+    std::vector<Change> changes{{options->path, options->value}};
+    for (std::size_t i = 0; i < options->more.size(); i += 2)
+      changes.push_back({options->more[i], options->more[i + 1]});
+    return SetCommand(options->file, changes, options->force, offers.Output());
   });
   for (CLI::App* command : {get, set}) {
     AddSetup(command, options->file);
     command->add_option("PATH", options->path, "The key, as SECTION/SECTION:KEY")->required();
   }
-  set->add_option("VALUE", options->value, "The value; several separated by commas; dates also as 2000-01-31 12:00")
-      ->required();
+  get->add_flag("--json", options->json, "As JSON, with its meaning and its default");
+  set->add_option("VALUE", options->value, "The value; see VALUES")->required();
+  set->add_option("MORE", options->more, "Further keys, each with its value behind it; all are changed, or none");
+  set->footer(
+      "VALUES. As the file holds them, several separated by commas; as a page takes them: the text of a choice\n"
+      "(\"Richards equation\"), a number with a unit (\"2 days\"), a date (2000-01-31, \"2000-01-31 12:00\"), a list "
+      "(3, 4).");
   set->add_flag("--force", options->force, "Also where an editor has the setup open");
 }
 

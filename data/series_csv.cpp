@@ -280,10 +280,33 @@ std::vector<std::string> CsvColumns(std::string_view text) {
 CsvSeries ReadCsvSeries(std::string_view text, std::string_view column) { return ReadSeries(text, column, false); }
 CsvSeries ReadPastedSeries(std::string_view text) { return ReadSeries(text, {}, true); }
 
-std::string WriteCsvSeries(const DataFile& file, std::string& text) {
+namespace {
+
+/// The begins of the intervals of a file's values. "" or why they are not known.
+std::string BeginsOf(const DataFile& file, std::vector<std::int64_t>& begins) {
+  const TimeAxis& time = file.Time();
+  for (const DataItem& item : file.Items())
+    if (item.valueType == ValueType::Instantaneous)
+      return fmt::format("the values of {} hold at their dates, which are no ends of intervals", item.name);
+  begins = time.stamps;
+  if (begins.empty()) return {};
+  if (!time.begin && begins.size() < 2) return "the file does not tell when the interval of its only value begins";
+  begins.pop_back();
+  // An interval without a begin of its own is as long as the next one.
+  begins.insert(begins.begin(), time.begin ? time.begin->SecondsSinceEpoch() : 2 * time.stamps[0] - time.stamps[1]);
+  return {};
+}
+
+}  // namespace
+
+std::string WriteCsvSeries(const DataFile& file, CsvStamps stamps, std::string& text) {
   const std::vector<DataItem>& items = file.Items();
   const std::size_t steps = file.Time().steps;
   if (!file.Time().hasDates) return fmt::format("cannot export {}: it has no dates", file.Path());
+  std::vector<std::int64_t> dates = file.Time().stamps;
+  if (stamps == CsvStamps::Begins)
+    if (const std::string reason = BeginsOf(file, dates); !reason.empty())
+      return fmt::format("cannot export {} with begins: {}", file.Path(), reason);
   std::vector<std::vector<float>> values(items.size());
   text = "time";
   for (std::size_t i = 0; i < items.size(); ++i) {
@@ -304,7 +327,7 @@ std::string WriteCsvSeries(const DataFile& file, std::string& text) {
   }
   text += '\n';
   for (std::size_t step = 0; step < steps; ++step) {
-    text += file.Time().Stamp(step).Format(kFormat);
+    text += CYbDateTime::FromSecondsSinceEpoch(dates[step]).Format(kFormat);
     for (const std::vector<float>& series : values) {
       text += ',';
       if (series[step] != kDeleteValue) text += ShortestNumber(series[step]);

@@ -34,8 +34,11 @@ CsvSeries ReadCsvSeries(std::string_view text, std::string_view column);
 /// first line has none of the signs, the last blank of each line separates.
 CsvSeries ReadPastedSeries(std::string_view text);
 
+/// What the dates of a table are: each the end of the interval of its value, as in the file, or its begin.
+enum class CsvStamps { Ends, Begins };
+
 /// The items of a file of time series as such a table, in the file's units; missing values are empty cells. "" or why
 /// not.
-std::string WriteCsvSeries(const DataFile& file, std::string& text);
+std::string WriteCsvSeries(const DataFile& file, CsvStamps stamps, std::string& text);
 
 }  // namespace tervane

@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "engine/engine_program.h"
 
+#include <new>
+
 #include <fmt/format.h>
 
 #include "document/flow_model_document.h"
@@ -29,23 +31,20 @@ Tasks TasksOf(const std::string& option, const CFlowModelDoc& document) {
   return {flags->PP != 0, flags->WM != 0, flags->WQ != 0 && components->WQ != 0};
 }
 
-}  // namespace
-
-EngineStatus RunEngineProgram(const std::vector<std::string>& arguments, std::ostream& out) {
-  EngineOutput log(out);
+EngineStatus Run(const std::vector<std::string>& arguments, EngineOutput& log) {
   std::string setup, option;
   for (const std::string& argument : arguments) {
     const bool isOption = argument == "/PP" || argument == "/WM" || argument == "/WQ";
     std::string& place = isOption ? option : setup;
     if (!place.empty() || argument.empty()) {
       log.Error({}, "usage: Tvn_Simulation SETUP.tvd [/PP | /WM | /WQ]");
-      return kEngineMisused;
+      return kEngineCouldNot;
     }
     place = argument;
   }
   if (setup.empty()) {
     log.Error({}, "usage: Tvn_Simulation SETUP.tvd [/PP | /WM | /WQ]");
-    return kEngineMisused;
+    return kEngineCouldNot;
   }
   log.Progress(0, "Reading the setup");
   CFlowModelDoc document;
@@ -63,6 +62,18 @@ EngineStatus RunEngineProgram(const std::vector<std::string>& arguments, std::os
   }
   log.Progress(100, "Done");
   return kEngineDone;
+}
+
+}  // namespace
+
+EngineStatus RunEngineProgram(const std::vector<std::string>& arguments, std::ostream& out) {
+  EngineOutput log(out);
+  try {
+    return Run(arguments, log);
+  } catch (const std::bad_alloc&) {
+    log.Error({}, "there is not enough memory for this setup");
+    return kEngineCouldNot;
+  }
 }
 
 }  // namespace tervane

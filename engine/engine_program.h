@@ -9,7 +9,7 @@
 namespace tervane {
 
 /// Statuses of the engine's process.
-enum EngineStatus : int { kEngineDone = 0, kEngineFailed = 1, kEngineMisused = 2 };
+enum EngineStatus : int { kEngineDone = 0, kEngineFailed = 1, kEngineCouldNot = 2 };
 
 /// Runs a setup: `SETUP.tvd` and at most one of `/PP`, `/WM`, `/WQ`; without one the setup says itself what is run. All
 /// messages go to `out`. This engine preprocesses alone: a run that asks for more ends as failed, behind the

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "cli/command_line.h"
 
+#include <algorithm>
 #include <filesystem>
 #include <map>
 #include <sstream>
@@ -115,6 +116,92 @@ TEST_F(CommandLine, TreeListsTheNodesThatTakePartOrAll) {
   EXPECT_THAT(Tervane({"tree", file, "--paths"}).out, HasSubstr("\nSimSpec/SimTitle\n"));
 }
 
+TEST_F(CommandLine, CountsThatNoSectionsStandForAskForLittleMemory) {
+  folder.Write("a.tvd", SetupText(14, R"(section ExtraParams {
+  YbSEKvfListItemCount = 1000000000
+  NoOfParams = 1000000000
+}
+section Subcatchments {
+  NO_ZONES = 1000000000
+}
+section Climate {
+  section PrecipitationRate {
+    section STATION_BASED {
+      NO_TIMESERIES = 1000000000
+    }
+  }
+}
+section Overlays {
+  section Background {
+    YbSEKvfListItemCount = 1000000000
+  }
+})"));
+  const Outcome check = Tervane({"check", file});
+  EXPECT_EQ(check.status, kFindings);
+  for (const char* key : {"ExtraParams:YbSEKvfListItemCount", "ExtraParams:NoOfParams", "Subcatchments:NO_ZONES",
+                          "Climate/PrecipitationRate/STATION_BASED:NO_TIMESERIES", "Background:YbSEKvfListItemCount"})
+    EXPECT_THAT(check.out, HasSubstr(std::string(key) + ": a count of 1000000000 is cut to 100"));
+}
+
+TEST_F(CommandLine, TitlesReachTheTerminalWithoutWhatItWouldObey) {
+  Tervane({"new", file});
+  Tervane({"set", file, "ExtraParams:NoOfParams", "1", "ExtraParams/ExtraParam_1:Name", "a\x1b[31m\xc2\x9b\nb"});
+  EXPECT_EQ(Tervane({"get", file, "ExtraParams/ExtraParam_1:Name"}).out, "a\\u{1b}[31m\\u{9b}\nb\n");
+  EXPECT_STREQ(Json(Tervane({"get", file, "ExtraParams/ExtraParam_1:Name", "--json"}))["values"][0].GetString(),
+               "a\x1b[31m\xc2\x9b\nb");
+  EXPECT_THAT(Tervane({"check", "no\x1b[2J\xff"}).err, HasSubstr("no\\u{1b}[2J\\xff"));
+  // A finding stays one line.
+  folder.Write("a.tvd", SetupText(14, "section \"a\\nb\" {\n}"));
+  const std::string found = Tervane({"check", file}).out;
+  EXPECT_THAT(found, HasSubstr("a\\nb"));
+  EXPECT_EQ(std::ranges::count(found, '\n'), 2) << found;
+}
+
+TEST_F(CommandLine, WhatIsUnlikelyIsAWarningAtItsKey) {
+  const struct {
+    Arguments changes;
+    const char* finding;
+  } cases[] = {
+      {{"SimSpec/SimulationPeriod:SIMEND", "1999-12-31"},
+       "error: SimSpec/SimulationPeriod:SIMEND: The simulation ends before it begins (it begins at 2000-01-01 00:00"},
+      {{"SimSpec/CompControlParaTimeStep:InitialTimeStep", "0"},
+       "warning: SimSpec/CompControlParaTimeStep:InitialTimeStep: The value 0 is outside its range: above 0"},
+      {{"SimSpec/CompControlParaTimeStep:MaxAllowedSZTimeStep", "-1"}, "outside its range: above 0"},
+      {{"SimSpec/CompControlParaTimeStep:IncrementRate", "2"}, "outside its range: 0 to 1"},
+      {{"SimSpec/ModelComp:SZ", "1", "SimSpec/CompControlParaTimeStep:InitialTimeStep", "2 days"},
+       "InitialTimeStep: The initial time step is longer than any that is allowed (48 hours, and at most 24)"},
+      {{"SimSpec:ModelType", "7"}, "warning: SimSpec:ModelType: The value 7 is none of its choices"},
+      {{"Catchment:type", "2", "Catchment:sizeShp", "-5"},
+       "Catchment:sizeShp: The grid of the model cannot be made (the cell size is -5, not above 0)"}};
+  for (const auto& c : cases) {
+    Tervane({"new", file, "--force"});
+    Arguments set{"set", file};
+    set.insert(set.end(), c.changes.begin(), c.changes.end());
+    const Outcome outcome = Tervane(set);
+    EXPECT_EQ(outcome.status, kDone) << outcome.err;
+    EXPECT_THAT(Tervane({"check", file}).out, HasSubstr(c.finding));
+    // Who sets it is told at once.
+    EXPECT_THAT(outcome.err, Not(IsEmpty())) << c.finding;
+  }
+}
+
+TEST_F(CommandLine, FindingsOfOneCauseAreOneLineUnlessEachIsAskedFor) {
+  std::string stations;
+  for (int number = 1; number <= 5; ++number)
+    stations += fmt::format("section TIME_SERIES_{} {{\nTYPE = 2\n}}\n", number);
+  folder.Write("a.tvd", SetupText(14,
+                                  "section Climate {\nsection PrecipitationRate {\nDistributionType = 2\n"
+                                  "section STATION_BASED {\nNO_TIMESERIES = 5\n}\n" +
+                                      stations + "}\n}"));
+  const std::string place = "error: Climate/PrecipitationRate/TIME_SERIES_";
+  const std::string grouped = Tervane({"check", file}).out;
+  EXPECT_THAT(grouped,
+              HasSubstr(place + "*/TIME_SERIES_FILE:FILE_NAME: File is not valid: 5 times (no file is chosen)"));
+  EXPECT_THAT(grouped, Not(HasSubstr("TIME_SERIES_2")));
+  EXPECT_THAT(Tervane({"check", file, "--each"}).out, HasSubstr(place + "2/TIME_SERIES_FILE:FILE_NAME: File is not"));
+  EXPECT_GT(Json(Tervane({"check", file, "--json"}))["findings"].Size(), 5U);
+}
+
 TEST_F(CommandLine, GetAndShowTellValuesAsTheyWouldBeSaved) {
   folder.Write("a.tvd", SetupText(9, R"(section SimSpec {
       section CompControlParaTimeStep {
@@ -184,8 +271,57 @@ TEST_F(CommandLine, SetChangesOneValueAndNothingElse) {
   }
   Tervane({"set", file, "SimSpec/SimTitle:Touched", "1"});
   EXPECT_EQ(Tervane({"get", file, "SimSpec/SimTitle:Touched"}).out, "1\n");
+  EXPECT_EQ(Tervane({"new", folder.File("setup.txt")}).status, kCouldNot);
   Tervane({"set", file, "ExtraParams:NoOfParams", "2"});
   EXPECT_EQ(Tervane({"get", file, "ExtraParams/ExtraParam_2:Type"}).out, "0\n");
+}
+
+TEST_F(CommandLine, SetTakesWhatAPageTakesAndSeveralKeysOrNone) {
+  const struct {
+    const char *path, *typed, *value;
+  } cases[] = {{"SimSpec/ModelComp:UZ_ModelType", "richards equation", "0"},
+               {"SimSpec:ModelType", "MODFLOW 96", "2"},
+               {"Climate/PrecipitationRate:DistributionType", "Station based", "2"},  // Counted from 1.
+               {"SimSpec/CompControlParaTimeStep:MaxAllowedSZTimeStep", "2 days", "48"},
+               {"SimSpec/CompControlParaTimeStep:MaxAllowedSZTimeStep", "36", "36"},
+               {"Topography:SearchRadius", "1.5 km", "1500"},
+               {"SimSpec/SimulationPeriod:SIMEND", "2011-01-01", "2011, 1, 1, 0, 0"},
+               {"Topography/NDS_2D_DATA_FILE:ITEM_NUMBERS", "3, 4", "3, 4"},
+               {"Topography/SHAPE_FILE:ITEM_NUMBERS", "CODE", "CODE"}};
+  for (const auto& c : cases) {
+    Tervane({"new", file, "--force"});
+    const Outcome outcome = Tervane({"set", file, c.path, c.typed});
+    EXPECT_EQ(outcome.status, kDone) << outcome.err;
+    EXPECT_EQ(Tervane({"get", file, c.path}).out, c.value + std::string("\n")) << c.typed;
+  }
+  const std::string before = ReadFile(file);
+  const Outcome refused = Tervane({"set", file, "SimSpec/SimTitle:Title", "x", "SimSpec:ModelType", "Modflow"});
+  EXPECT_EQ(refused.status, kCouldNot);
+  EXPECT_THAT(refused.err, HasSubstr("one of 0 (Tervane), 1 (MODFLOW Surfact)"));
+  EXPECT_EQ(Tervane({"set", file, "SimSpec/SimTitle:Title", "x", "SimSpec:ModelType"}).status, kCouldNot);
+  EXPECT_EQ(ReadFile(file), before);
+}
+
+TEST_F(CommandLine, JsonTellsKeysAndPages) {
+  Tervane({"new", file});
+  const rapidjson::Document get = Json(Tervane({"get", file, "SimSpec:ModelType", "--json"}));
+  EXPECT_EQ(get["values"][0].GetInt(), 0);
+  EXPECT_STREQ(get["text"].GetString(), "Tervane");
+  const rapidjson::Document show = Json(Tervane({"show", file, "SimSpec/SimulationPeriod", "--json"}));
+  ASSERT_EQ(show["nodes"].Size(), 1U);
+  EXPECT_STREQ(show["nodes"][0]["path"].GetString(), "SimSpec/SimulationPeriod");
+  EXPECT_GT(show["nodes"][0]["keys"].Size(), 5U);
+  const rapidjson::Document page = Json(Tervane({"page", file, "SimSpec/SimulationPeriod", "--json"}));
+  EXPECT_STREQ(page["controls"][0]["label"].GetString(), "Start Date:");
+  EXPECT_TRUE(page["controls"][0]["enabled"].GetBool());
+  bool isFound = false;
+  const rapidjson::Document keys = Json(Tervane({"keys", "--json"}));
+  for (const auto& key : keys["keys"].GetArray())
+    if (key["path"] == "SimSpec" && key["key"] == "ModelType") {
+      isFound = true;
+      EXPECT_STREQ(key["choices"][2]["text"].GetString(), "MODFLOW 96");
+    }
+  EXPECT_TRUE(isFound);
 }
 
 TEST_F(CommandLine, WhatAnEditorHasOpenIsNotWrittenUnlessForced) {
@@ -213,10 +349,10 @@ TEST_F(CommandLine, SetRefusesWhatTheKeyDoesNotTakeAndWritesNothing) {
   struct Case {
     const char *path, *value, *message;
   };
-  const Case cases[] = {{"SimSpec:ModelType", "three", "a whole number from -2147483648 to 2147483647 was expected"},
+  const Case cases[] = {{"SimSpec:ModelType", "three", "one of 0 (Tervane), 1 (MODFLOW Surfact), "},
                         {"SimSpec:ModelType", "2147483648", "was expected"},
                         {"SimSpec/CompControlParaOL:RelaxFactor", "1e39", "a number that fits a float was expected"},
-                        {"SimSpec/SimulationPeriod:SIMEND", "2001", "5 values separated by commas was expected"},
+                        {"SimSpec/SimulationPeriod:SIMEND", "2001", "a date as 2000-01-31 12:00, or its numbers"},
                         {"SimSpec/SimTitle:Title", "\xFF", "UTF-8"},
                         // Computed at every save; this engine knows one kind of recharge.
                         {"SimSpec:IsDataUsedInSetup", "0", "does not take this value: it would be saved as 1"},
@@ -275,7 +411,7 @@ TEST_F(CommandLine, KeysListsEveryKeyWithTypeAndDefault) {
   EXPECT_THAT(text, HasSubstr("\nSimSpec/CompControlParaOL:IterStopCriteria\tfloat\t\tup to version 9, read only\t\n"));
   const std::string markdown = Tervane({"keys", "--markdown"}).out;
   EXPECT_THAT(markdown, StartsWith("# Keys of a setup\n"));
-  EXPECT_THAT(markdown, HasSubstr("| `MaxInfiltDepthPerTimeStep ` | float | `10f` | from version 7 | mm |\n"));
+  EXPECT_THAT(markdown, HasSubstr("| `MaxInfiltDepthPerTimeStep ` | float | `10f` | from version 7 | mm; above 0 |\n"));
 }
 
 TEST_F(CommandLine, WhatIsNoSetupIsRefusedWithoutATrace) {
@@ -331,6 +467,8 @@ TEST_F(CommandLine, AnUnknownCommandOrAMissingArgumentIsTold) {
     EXPECT_EQ(outcome.status, kCouldNot);
     EXPECT_THAT(outcome.err, Not(IsEmpty()));
   }
+  EXPECT_THAT(Tervane({"chek", "a"}).err, HasSubstr("there is no command chek; did you mean check?"));
+  EXPECT_THAT(Tervane({"data", "stat"}).err, HasSubstr("there is no command data stat; did you mean stats?"));
   for (const char* command :
        {"new", "check", "tree", "show", "page", "get", "set", "convert", "diff", "keys", "completion"})
     EXPECT_THAT(Tervane({command, "--help"}).out, HasSubstr("Usage: tervane " + std::string(command)));

@@ -22,3 +22,12 @@ offers "tervane ch" check
 offers "tervane tree --a" --all
 offers "tervane check a" a.tvd
 offers "tervane get a.tvd SimSpec/Sim" SimSpec/SimTitle
+offers "tervane get a.tvd SimSpec/SimTitle:Ti" SimSpec/SimTitle:Title
+offers "tervane get a.tvd SimSpec/SimTitle : Ti" Title
+offers "tervane set a.tvd SimSpec :" ModelType
+offers "tervane data stats --j" --json
+offers "tervane import grid --l" --like
+if (offers "tervane import series --l" --like) >/dev/null; then
+  echo "import series offers an option of import grid"
+  exit 1
+fi

@@ -1,5 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <filesystem>
 #include <sstream>
 
 #include <gmock/gmock.h>
@@ -9,7 +10,9 @@
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "geometry/cart.h"
+#include "platform/files.h"
 #include "platform/text.h"
+#include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {
@@ -71,6 +74,10 @@ TEST(DataCommands, InfoAndStatsTellWhatAGridHolds) {
             "item 1: Rain \"A\" [millimeter per day]: smallest 1.5, largest 3, mean 2.16667, 6 values, 2 missing\n"
             "  step 1, 2001-01-02: smallest 1.5, largest 2.5, mean 2, 3 values, 1 missing\n"
             "  step 2, 2001-01-03: smallest 1.5, largest 3, mean 2.33333, 3 values, 1 missing\n");
+  json.Parse(Tervane({"data", "stats", path, "--json"}).out.c_str());
+  ASSERT_FALSE(json.HasParseError());
+  EXPECT_EQ(json["items"][0]["all"]["values"].GetInt(), 6);
+  EXPECT_EQ(json["items"][0]["steps"][0]["largest"].GetDouble(), 2.5);
   EXPECT_THAT(Tervane({"export", path, folder.File("a.csv")}).err, HasSubstr("is no time series"));
   const Outcome missing = Tervane({"data", "info", folder.File("b.nds2")});
   EXPECT_EQ(missing.status, kCouldNot);
@@ -96,6 +103,17 @@ TEST(DataCommands, ASeriesGoesFromATableToADataFileAndBack) {
   EXPECT_EQ(ReadFile(back),
             "time,\"Flow [millimeter per hour]\"\n2000-02-29 00:00:00,1.5\n2000-03-01 00:00:00,\n"
             "2000-03-02 00:00:00,0.25\n");
+  // With the dates as they were in the table that it came from, it comes back as it was.
+  const Outcome begins = Tervane({"export", series, back, "--stamps", "begin", "--force"});
+  EXPECT_THAT(begins.out, HasSubstr("3 steps, each date is the begin of its interval"));
+  EXPECT_THAT(ReadFile(back), HasSubstr("\n2000-02-28 00:00:00,1.5\n"));
+  EXPECT_EQ(Tervane({"import", "series", back, series, "--item", "100182", "--unit", "mm/h", "--stamps", "begin",
+                     "--value-type", "mean-step", "--force"})
+                .status,
+            kDone);
+  EXPECT_THAT(Tervane({"export", series, back, "--force"}).out,
+              HasSubstr("each date is the end of its interval; --st"));
+  EXPECT_THAT(ReadFile(back), HasSubstr("\n2000-02-29 00:00:00,1.5\n"));
   // Again, from what was exported; a unit that is not of the table is brought to the base unit.
   const std::string again = folder.File("b.nds0");
   EXPECT_EQ(Tervane({"import", "series", back, again, "--item", "100182", "--unit", "10 mm/day"}).status, kDone);
@@ -110,10 +128,36 @@ TEST(DataCommands, EachColumnBecomesAnItem) {
   const std::string csv = folder.Write("in.csv", "t,a,b,c\n2000-01-01,1,10,100\n2000-01-02,2,20,200\n");
   const std::string out = folder.File("a.nds0"), back = folder.File("back.csv");
   EXPECT_EQ(Tervane({"import", "series", csv, "--column", "c", "--column", "a", out, "--item", "999"}).status, kDone);
-  EXPECT_EQ(Tervane({"export", out, back}).status, kDone);
+  EXPECT_THAT(Tervane({"export", out, back}).out, HasSubstr("each value holds at its date"));
+  EXPECT_THAT(Tervane({"export", out, folder.File("c.csv"), "--stamps", "begin"}).err,
+              HasSubstr("hold at their dates"));
   EXPECT_EQ(ReadFile(back), "time,\"c\",\"a\"\n2000-01-01 00:00:00,100,1\n2000-01-02 00:00:00,200,2\n");
   const Outcome all = Tervane({"import", "series", csv, out, "--item", "999", "--all-columns", "--force"});
   EXPECT_THAT(all.out, HasSubstr("3 items, 2 steps"));
+}
+
+TEST(DataCommands, PointsThatAreNoRasterAreToldAsPoints) {
+  const TempFolder folder;
+  const std::string out = folder.File("a.nds2");
+  const std::pair<const char*, const char*> cases[] = {
+      {"1 2 3\n1 5 6\n5 5 7\n", "its 3 points stand on no regular grid: name the file as \"Point XYZ(.txt)\""},
+      {"1 2 3\n1 2 x\n", "d.xyz, line 2: z is \"x\", which is no number"}};
+  for (const auto& [text, reason] : cases) {
+    const Outcome outcome = Tervane({"import", "grid", folder.Write("d.xyz", text), out, "--item", "100180"});
+    EXPECT_EQ(outcome.status, kCouldNot);
+    EXPECT_THAT(outcome.err, HasSubstr(reason));
+    EXPECT_FALSE(FileExists(out));
+  }
+}
+
+TEST(DataCommands, ANoteOnAShapeTellsItsFolderOnce) {
+  const TempFolder folder;
+  test::WriteShapes(folder.File("zones.shp"), ShapeKind::Point, AttributeKind::Real, {4.0, 6.0});
+  std::filesystem::remove(folder.File("zones.dbf"));
+  std::filesystem::remove(folder.File("zones.shx"));
+  EXPECT_EQ(Tervane({"data", "info", folder.File("zones.shp")}).err,
+            folder.File("zones.shp") + ": note: zones.shx is missing; the index was made anew from the shapes\n" +
+                folder.File("zones.shp") + ": note: zones.shp has no attributes: zones.dbf does not exist beside it\n");
 }
 
 TEST(DataCommands, AnImportThatIsRefusedWritesNothing) {

@@ -37,9 +37,9 @@ class RunCommand : public testing::Test {
 };
 
 TEST_F(RunCommand, PassesTheEnginesWordsOnAndTellsHowItEnded) {
-  EXPECT_EQ(Tervane("echo \"got $2\"; printf last", {"--wm"}), kDone);
-  EXPECT_EQ(out.str(), "got /WM\nlast");
-  EXPECT_THAT(err.str(), testing::MatchesRegex(".*karup.tvd: The run is done after .* s\\.\n"));
+  EXPECT_EQ(Tervane("echo \"got $2\"; echo progress 50 half; printf last", {"--wm"}), kDone);
+  EXPECT_EQ(out.str(), "got /WM\nlast\n");
+  EXPECT_THAT(err.str(), testing::MatchesRegex("progress 50 half\n.*karup.tvd: The run is done after .* s\\.\n"));
   EXPECT_EQ(Tervane("exit 7", {"--pp"}), kFindings);
   EXPECT_THAT(err.str(), HasSubstr("exit status 7"));
   // What the setup asks for, the preprocessor, should have left its report.
