@@ -6,9 +6,9 @@
 
 #include <algorithm>
 #include <chrono>
-#include <cstdint>
 #include <filesystem>
 #include <functional>
+#include <list>
 #include <memory>
 #include <mutex>
 #include <string>
@@ -44,9 +44,9 @@ class FileCache {
     const std::string key = path + '\0' + question;
     {
       const std::lock_guard lock(mutex_);
-      if (const auto found = entries_.find(key); found != entries_.end() && found->second.stamps == stamps) {
-        found->second.lastAsked = ++clock_;
-        return found->second.answer;
+      if (const auto found = places_.find(key); found != places_.end() && found->second->stamps == stamps) {
+        entries_.splice(entries_.begin(), entries_, found->second);
+        return entries_.front().answer;
       }
     }
     // Asked before the reading; a file that was written just now may be written again within one tick of its clock.
@@ -55,9 +55,13 @@ class FileCache {
     auto answer = std::make_shared<const Answer>(read());
     if (!mayBeKept) return answer;
     const std::lock_guard lock(mutex_);
-    entries_[key] = {stamps, answer, ++clock_};
-    if (entries_.size() > most_)
-      entries_.erase(std::ranges::min_element(entries_, {}, [](const auto& entry) { return entry.second.lastAsked; }));
+    if (const auto found = places_.find(key); found != places_.end()) entries_.erase(found->second);
+    entries_.push_front({key, stamps, answer});
+    places_[key] = entries_.begin();
+    if (entries_.size() > most_) {
+      places_.erase(entries_.back().key);
+      entries_.pop_back();
+    }
     return answer;
   }
   /// The same of a single file.
@@ -74,18 +78,18 @@ class FileCache {
   }
 
   struct Entry {
+    std::string key;
     FileStamps stamps;
     std::shared_ptr<const Answer> answer;
-    std::uint64_t lastAsked = 0;
   };
 
   const std::size_t most_;
   std::mutex mutex_;
-  std::uint64_t clock_ = 0;
-  std::unordered_map<std::string, Entry> entries_;
+  std::list<Entry> entries_;  ///< The latest that was asked for in front.
+  std::unordered_map<std::string, typename std::list<Entry>::iterator> places_;
 };
 
 /// How many facts of one kind are kept: more than a large setup names files.
-inline constexpr std::size_t kMostFacts = 2000;
+inline constexpr std::size_t kMostFacts = 20'000;
 
 }  // namespace tervane
