@@ -430,10 +430,11 @@ std::string FormText(PageForm& form, int level) {
     const std::string indent(2 * static_cast<std::size_t>(level), ' ');
     const std::string unit = control->UnitText();
     text += fmt::format("{}{} \"{}\"{}{}{}{}\n", indent, NameOf(control->kind), Replaced(control->label, "\n", " "),
-                        IsTextOfLines(*control) ? "" : ShownValue(*control), unit.empty() ? "" : " " + unit, control->IsEnabled() ? "" : " disabled",
-                        control->IsShown() ? "" : " hidden");
+                        IsTextOfLines(*control) ? "" : ShownValue(*control), unit.empty() ? "" : " " + unit,
+                        control->IsEnabled() ? "" : " disabled", control->IsShown() ? "" : " hidden");
     if (IsTextOfLines(*control))
-      text += Lines(control->kind == ControlKind::Browser ? TextOfHtml(control->Text()) : control->Text(), indent + "  ");
+      text +=
+          Lines(control->kind == ControlKind::Browser ? TextOfHtml(control->Text()) : control->Text(), indent + "  ");
     if (control->group) text += FormText(*control->group, level + 1);
     if (control->table) text += TableText(*control->table, level + 1);
     if (control->kind == ControlKind::SubForms) {

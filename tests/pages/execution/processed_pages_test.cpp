@@ -209,7 +209,7 @@ TEST(ProcessedPages, WhatTheReportSaysOfALayerAndAPeriodMayBeWrong) {
        "StartDate = 2001,13 in the report is no date"},
       {"NDS0_PLOT {\nFilename = file \"karup_0d.nds0\"\nItemNo = 1\nStartDate = 2001, 1, 1", "notice \"\" = \n"},
       {"HTML {\nHtml = \"../../etc/nothing.htm\"", "cannot read"},
-      {"TEXT {\nText = \"a\\\\nb\\\\rc\"", "= a\r\\nb\rc"},
+      {"TEXT {\nText = \"a\\\\nb\\\\rc\"", "\n  a\n  b\rc\n"},
   };
   RunSetup run;
   for (const auto& c : cases) {
