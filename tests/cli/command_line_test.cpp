@@ -230,7 +230,7 @@ TEST_F(CommandLine, PageShowsTheControlsOfANode) {
   Tervane({"new", file});
   EXPECT_EQ(Tervane({"page", file, "SimSpec/SimTitle"}).out,
             "text \"Simulation Title:\" = \nlong text \"Simulation Description:\" = \n");
-  EXPECT_THAT(Tervane({"page", file, "CIntroductionKvf"}).out, HasSubstr("<h1>Tervane</h1>"));
+  EXPECT_THAT(Tervane({"page", file, "CIntroductionKvf"}).out, HasSubstr("browser \"\"\n  Tervane\n  This editor"));
   EXPECT_EQ(Tervane({"page", file, "FlowModelDocVersion"}).status, kCouldNot);
 }
 
@@ -391,7 +391,7 @@ TEST_F(CommandLine, ConvertLeavesTheFileItReadsAndOtherFilesAlone) {
 
 TEST_F(CommandLine, DiffComparesBySectionAndKey) {
   folder.Write("a.tvd", SetupText(14, "section SimSpec {\nModelType = 1\n}"));
-  const std::string other = folder.Write("b.tvd", SetupText(9, ""));
+  const std::string other = folder.Write("b.tvd", SetupText(14, ""));
   EXPECT_EQ(Tervane({"diff", file, file}).status, kDone);
   EXPECT_EQ(Tervane({"diff", file, file, "--json"}).out, "{\"differences\": []}\n");
   const Outcome outcome = Tervane({"diff", file, other});

@@ -176,10 +176,14 @@ TEST(Periods, EveryDateThatIsWrongIsTold) {
     setup.Root().Validate();
     EXPECT_THAT(period.Findings(), SizeIs(count)) << type;
   }
-  simulation.SIMEND = {1990, 1, 1};  // Dates that run backwards are no error of their own.
+  simulation.SIMEND = {1990, 1, 1};
   setup.Root().Validate();
-  EXPECT_THAT(simulation.Findings(), IsEmpty());
+  EXPECT_EQ(simulation.Findings().at(0).text, "The simulation ends before it begins");
+  EXPECT_EQ(simulation.Valid(), 0);
   EXPECT_THAT(period.Findings(), SizeIs(1));
+  simulation.SIMEND = simulation.GetSimStartDate();
+  setup.Root().Validate();
+  EXPECT_EQ(simulation.Findings().at(0).severity, Severity::Warning);
 }
 
 }  // namespace

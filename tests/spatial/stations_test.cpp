@@ -168,7 +168,8 @@ TEST_F(Stations, OfACountThatTheFileDoesNotHoldAreAtTheirDefaults) {
   const struct {
     const char* count;
     std::size_t stations, notes;
-  } cases[] = {{"3", 3, 0}, {"0", 0, 0}, {"-1", 0, 1}, {"2147483647", 1001, 1}};  // One section stands there, of another kind.
+  } cases[] = {
+      {"3", 3, 0}, {"0", 0, 0}, {"-1", 0, 1}, {"2147483647", 1001, 1}};  // One section stands there, of another kind.
   for (const auto& c : cases) {
     CFlowModelDoc opened;
     ASSERT_TRUE(opened.OpenText(
