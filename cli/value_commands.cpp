@@ -65,7 +65,7 @@ std::unique_ptr<CFlowModelDoc> Changed(CFlowModelDoc& document, const Change& ch
   KvfSection* section = written.SectionOf(*node);
   KvfNode* key = section ? FindKeyOrReport(*section, path.key, change.path, streams) : nullptr;
   if (!key) return nullptr;
-  const KeyInfo* info = reference.KeyOf(PathOf(*node), Trimmed(path.key.name));
+  const KeyInfo* info = reference.Find(PathOf(*node), Trimmed(path.key.name));
   if (const std::string expected = TakeTyped(change.value, info, *section, *key); !expected.empty())
     return refuse(expected + " was expected");
   const std::string wanted = KvfValuesText(*key);
@@ -137,7 +137,7 @@ std::string JsonKey(const KvfNode& keyword, std::string_view sectionPath, const 
   std::vector<std::string> values;
   for (std::uint32_t i = 0; i < keyword.count; ++i) values.push_back(JsonValue(keyword.params[i]));
   const auto optional = [](std::string_view text) { return text.empty() ? std::string() : JsonQuoted(text); };
-  const KeyInfo* info = reference.KeyOf(sectionPath, keyword.Name());
+  const KeyInfo* info = reference.Find(sectionPath, keyword.Name());
   const bool hasChoices = info && !info->facts.choices.empty();
   const std::string_view meaning = reference.MeaningOf(sectionPath, keyword.Name(), KvfValuesText(keyword));
   return JsonObject({{"key", JsonQuoted(keyword.Name())},

@@ -70,7 +70,7 @@ std::vector<UndoStack::Change> UndoStack::CaptureAll() {
   return changes;
 }
 
-bool UndoStack::Commit(const std::string& name, const void* source, Time now) {
+bool UndoStack::Commit(const std::string& name, const void* source, Time now, StepPlace place) {
   std::vector<Change> changes = CaptureAll();
   if (changes.empty()) return false;
   steps_.erase(steps_.begin() + static_cast<std::ptrdiff_t>(done_), steps_.end());
@@ -81,6 +81,7 @@ bool UndoStack::Commit(const std::string& name, const void* source, Time now) {
   if (melts) {
     Step& last = steps_.back();
     last.time = now;
+    last.state = ++lastState_;
     for (Change& change : changes) {
       const auto same = std::find_if(last.changes.begin(), last.changes.end(),
                                      [&](const Change& other) { return other.node == change.node; });
@@ -91,7 +92,7 @@ bool UndoStack::Commit(const std::string& name, const void* source, Time now) {
     }
     return true;
   }
-  steps_.push_back({name, source, now, std::move(changes)});
+  steps_.push_back({name, source, now, std::move(place), ++lastState_, std::move(changes)});
   if (steps_.size() > kMostSteps) {
     steps_.pop_front();
     if (saved_ != static_cast<std::size_t>(-1)) saved_ = saved_ == 0 ? static_cast<std::size_t>(-1) : saved_ - 1;

@@ -4,6 +4,7 @@
 
 #include <chrono>
 #include <cstddef>
+#include <cstdint>
 #include <deque>
 #include <memory>
 #include <string>
@@ -14,6 +15,12 @@
 #include "core/state_buffer.h"
 
 namespace tervane {
+
+/// Where a user has made a step: on a node's page, in the control of that name there; either may be unknown.
+struct StepPlace {
+  std::uint64_t node = 0;  ///< Its serial number.
+  std::string control;
+};
 
 /// Undoing by comparing: a shadow holds what every node held, and after each action of the user all that differs is one
 /// step. So no effect in another node is forgotten. Nodes that were taken out live on in their step and go back to
@@ -29,15 +36,22 @@ class UndoStack {
   void Reset();
   /// Takes what changed since the last call as one step of that name; false when nothing did. Steps of one source (a
   /// control) that follow each other within a second are one.
-  bool Commit(const std::string& name, const void* source = nullptr, Time now = std::chrono::steady_clock::now());
+  bool Commit(const std::string& name, const void* source = nullptr, Time now = std::chrono::steady_clock::now(),
+              StepPlace place = {});
 
   bool CanUndo() const { return done_ > 0; }
   bool CanRedo() const { return done_ < steps_.size(); }
   /// The name of the step that would be undone or redone; empty when there is none.
   std::string UndoName() const { return CanUndo() ? steps_[done_ - 1].name : std::string(); }
   std::string RedoName() const { return CanRedo() ? steps_[done_].name : std::string(); }
+  /// Where the step was made that would be undone or redone.
+  StepPlace UndoPlace() const { return CanUndo() ? steps_[done_ - 1].place : StepPlace(); }
+  StepPlace RedoPlace() const { return CanRedo() ? steps_[done_].place : StepPlace(); }
   bool Undo();
   bool Redo();
+
+  /// A number of the tree as it is now: the same again when undo and redo have come back to it.
+  std::uint64_t StateNumber() const { return CanUndo() ? steps_[done_ - 1].state : 0; }
 
   /// The tree is as it was saved.
   void MarkSaved() { saved_ = done_; }
@@ -65,6 +79,8 @@ class UndoStack {
     std::string name;
     const void* source;
     Time time;
+    StepPlace place;
+    std::uint64_t state;  ///< The number of the tree behind it.
     std::vector<Change> changes;
   };
   struct Shadow {
@@ -87,6 +103,7 @@ class UndoStack {
   std::deque<Step> steps_;
   std::size_t done_ = 0;  ///< Number of steps that are done; the others can be redone.
   std::size_t saved_ = 0;
+  std::uint64_t lastState_ = 0;
 };
 
 }  // namespace tervane

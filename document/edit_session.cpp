@@ -35,6 +35,16 @@ KvfSection& TargetOf(KvfFile& file, std::string_view name) {
   return target ? *target : *file.AddSection(file.top, KvfKind::Target, name);
 }
 
+/// The differences in all that a setup's file holds.
+std::vector<SetupDifference> CompareFiles(KvfFile& before, KvfFile& after, std::string_view setup) {
+  std::vector<SetupDifference> differences;
+  for (const std::string_view target : {setup, std::string_view("SYSTEM")})
+    for (SetupDifference& difference :
+         CompareSetups(TargetOf(before, target), TargetOf(after, target), KeyReference::Get()))
+      differences.push_back(std::move(difference));
+  return differences;
+}
+
 }  // namespace
 
 EditSession::EditSession(std::string recoveryFolder) : recoveryFolder_(std::move(recoveryFolder)) {}
@@ -129,7 +139,8 @@ void EditSession::Begin() { undo_ = std::make_unique<UndoStack>(document_->Root(
 
 // ---- Changes
 
-void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& action, const void* source) {
+void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& action, const void* source,
+                            std::string control) {
   if (hint == 0) {
     if (listener_) listener_(hint);
     return;
@@ -141,7 +152,8 @@ void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& act
     node.Validate();
   // A value that validation mends belongs to the step that made it wrong. What undo does not know of, such as the
   // custom result folder, counts as a change all the same.
-  if (!undo_->Commit(action, source)) document_->SetModified(true);
+  if (!undo_->Commit(action, source, std::chrono::steady_clock::now(), {node.Serial(), std::move(control)}))
+    document_->SetModified(true);
   if (listener_) listener_(hint);
 }
 
@@ -165,6 +177,22 @@ bool EditSession::Redo() {
 }
 
 bool EditSession::IsModified() const { return recovered_ || document_->IsModified() || !undo_->IsSaved(); }
+
+bool EditSession::HasChangesToSave() const {
+  if (!IsModified() || recovered_) return recovered_;
+  // Without its file all would be lost that the file does not hold.
+  if (!Path().empty() && !FileExists(Path())) return true;
+  // What the file means is held against what a save would write: keys that it lacks are no change.
+  CFlowModelDoc before;
+  if (!Path().empty() && !before.OnOpenDocument(Path())) return true;
+  return !Differences(before).empty();
+}
+
+std::vector<SetupDifference> EditSession::Differences(const CFlowModelDoc& before) const {
+  const std::string& folder = document_->Root().SetupFolder();
+  return CompareFiles(*OpenKvf(before.BuildFile(folder)), *OpenKvf(document_->BuildFile(folder)),
+                      document_->Root().GetTargetName());
+}
 
 // ---- The file
 
@@ -233,13 +261,7 @@ std::vector<SetupDifference> EditSession::WhatWillBeSaved(std::string& error) co
     }
   }
   const OpenKvf after(document_->BuildFile(document_->Root().SetupFolder()));
-  static const KeyReference reference;
-  std::vector<SetupDifference> differences;
-  for (const std::string_view target :
-       {std::string_view(document_->Root().GetTargetName()), std::string_view("SYSTEM")})
-    for (SetupDifference& difference : CompareSetups(TargetOf(*before, target), TargetOf(*after, target), reference))
-      differences.push_back(std::move(difference));
-  return differences;
+  return CompareFiles(*before, *after, document_->Root().GetTargetName());
 }
 
 // ---- Autosave

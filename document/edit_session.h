@@ -49,11 +49,15 @@ class EditSession {
   void Listen(Listener listener) { listener_ = std::move(listener); }
   /// Takes what a user did as one step to undo, validates `node` and what is below it (or all, where that was asked
   /// for), and tells the listener. Hint 0 tells the listener and does nothing else: the document is as it was.
-  void UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& action, const void* source = nullptr);
+  /// `control` is the name of the control on the node's page in which it was done, if it was in one.
+  void UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& action, const void* source = nullptr,
+                 std::string control = {});
   bool Undo();
   bool Redo();
   const UndoStack& Steps() const { return *undo_; }
   bool IsModified() const;
+  /// Whether a save would change the file: not so after a change that was taken back, or one of what is shown alone.
+  bool HasChangesToSave() const;
 
   // ---- The file
 
@@ -93,6 +97,8 @@ class EditSession {
   /// Ends what loading began.
   void Begin();
   void ValidateAllAndNotify();
+  /// What a save would write otherwise than one of that document.
+  std::vector<SetupDifference> Differences(const CFlowModelDoc& before) const;
   std::string AutosaveText(std::string& error) const;
   void RemoveAutosavesBut(const std::string& kept);
 

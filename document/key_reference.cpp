@@ -37,6 +37,19 @@ std::string Numbered(const std::string& name) {
 
 }  // namespace
 
+std::string NumberlessPath(std::string_view path) {
+  std::string result;
+  while (!path.empty()) {
+    const std::size_t end = std::min(path.find('/'), path.size());
+    result += Numbered(std::string(path.substr(0, end)));
+    path.remove_prefix(end);
+    if (path.empty()) break;
+    result += '/';
+    path.remove_prefix(1);
+  }
+  return result;
+}
+
 KeyReference::KeyReference() {
   CGlobal root;
   for (CYbSEKvfBase* child = root.GetFirstChild(); child; child = root.GetNextChild(child))
@@ -54,7 +67,12 @@ std::string KeyReference::PathOfKind(std::string_view sectionPath) const {
   return path;
 }
 
-const KeyInfo* KeyReference::KeyOf(std::string_view sectionPath, std::string_view key) const {
+const KeyReference& KeyReference::Get() {
+  static const KeyReference reference;
+  return reference;
+}
+
+const KeyInfo* KeyReference::Find(std::string_view sectionPath, std::string_view key) const {
   auto found = byPath_.find(std::string(sectionPath));
   if (found == byPath_.end()) found = byPath_.find(PathOfKind(sectionPath));
   if (found == byPath_.end()) return nullptr;
@@ -64,13 +82,13 @@ const KeyInfo* KeyReference::KeyOf(std::string_view sectionPath, std::string_vie
 }
 
 std::string_view KeyReference::DefaultOf(std::string_view sectionPath, std::string_view key) const {
-  const KeyInfo* const info = KeyOf(sectionPath, key);
+  const KeyInfo* const info = Find(sectionPath, key);
   return info ? std::string_view(info->defaultValue) : std::string_view();
 }
 
 std::string_view KeyReference::MeaningOf(std::string_view sectionPath, std::string_view key,
                                          std::string_view value) const {
-  const KeyInfo* const info = KeyOf(sectionPath, key);
+  const KeyInfo* const info = Find(sectionPath, key);
   if (!info) return {};
   if (info->facts.choices.empty()) return info->facts.UnitText();
   int number = 0;

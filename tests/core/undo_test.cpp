@@ -111,6 +111,30 @@ TEST_F(UndoOfASetup, NothingChangedIsNoStepAndOneControlWithinASecondIsOne) {
   EXPECT_FALSE(undo.CanUndo());
 }
 
+TEST_F(UndoOfASetup, StepsTellWhereTheyWereMadeAndStatesAreKnownAgain) {
+  auto& title = *document.Root().Important(kBasicParameters)->Child<CSimTitleKvf>();
+  const auto type = [&](const char* text, const char* control) {
+    title.Title = text;
+    EXPECT_TRUE(undo.Commit("Change Title", nullptr, {}, {title.Serial(), control}));
+    return undo.StateNumber();
+  };
+  const std::uint64_t opened = undo.StateNumber();
+  const std::uint64_t first = type("K", "Title"), second = type("Ka", "Other");
+  EXPECT_EQ(undo.UndoPlace().control, "Other");
+  EXPECT_EQ(undo.UndoPlace().node, title.Serial());
+  undo.Undo();
+  EXPECT_EQ(undo.StateNumber(), first);
+  EXPECT_EQ(undo.RedoPlace().control, "Other");
+  undo.Undo();
+  EXPECT_EQ(undo.StateNumber(), opened);
+  EXPECT_EQ(undo.UndoPlace().node, 0u);
+  undo.Redo();
+  undo.Redo();
+  EXPECT_EQ(undo.StateNumber(), second);
+  undo.Undo();
+  EXPECT_NE(type("Kb", "Title"), second);  // another tree, as deep
+}
+
 TEST_F(UndoOfASetup, KnowsWhetherTheTreeIsAsItWasSaved) {
   auto& basics = *document.Root().Important(kBasicParameters);
   const auto change = [&](int engine) {

@@ -154,6 +154,37 @@ TEST_F(EditSessionTest, ChangesAreUndoneAndViewsAreTold) {
   EXPECT_THAT(Session(Open(path))->Document().UseCustomResultFolder, true);
 }
 
+TEST_F(EditSessionTest, OnlyWhatASaveWouldChangeInTheFileIsToBeSaved) {
+  Session session = Open();
+  const auto refresh = [&] { session->UpdateDoc(session->Document().Root(), 64, "Refresh"); };
+  refresh();
+  EXPECT_TRUE(session->IsModified());
+  EXPECT_FALSE(session->HasChangesToSave());
+  SetTitle(*session, "Karup");
+  EXPECT_TRUE(session->HasChangesToSave());
+  SetTitle(*session, "");  // as it was, by a step of its own
+  EXPECT_TRUE(session->IsModified());
+  EXPECT_FALSE(session->HasChangesToSave());
+  SetTitle(*session, "Karup");
+  ASSERT_TRUE(session->Save());
+  session->Undo();
+  EXPECT_TRUE(session->HasChangesToSave());
+  // Nothing may be lost where the file cannot be looked at.
+  session->Redo();
+  refresh();
+  EXPECT_FALSE(session->HasChangesToSave());
+  folder.Write("a.tvd", "no setup {");
+  EXPECT_TRUE(session->HasChangesToSave());
+  std::filesystem::remove(path);
+  EXPECT_TRUE(session->HasChangesToSave());
+
+  Session fresh = EditSession::New(kept);
+  fresh->UpdateDoc(fresh->Document().Root(), 64, "Refresh");
+  EXPECT_FALSE(fresh->HasChangesToSave());
+  SetTitle(*fresh, "Karup");
+  EXPECT_TRUE(fresh->HasChangesToSave());
+}
+
 TEST_F(EditSessionTest, FindingsFollowChangesOfTheNodeOrOfAllWhereThatWasAskedFor) {
   folder.Write("a.tvd", ReadFile(TERVANE_SOURCE_DIR "/examples/water_quality.tvd"));
   Session session = Open();
