@@ -83,9 +83,7 @@ void RunFollower::Follow() {
     if (isOver && !hasMore) break;
     if (!hasMore) changed_.wait_for(lock, kInterval, [this] { return isLeft_ || stops_ > 0; });
   }
-  LogPiece rest = lines_.Rest();
-  Understand(rest);
-  news_.log.Add(std::move(rest));
+  news_.log.Add(Understand(lines_.Rest()));
   news_.extraLog.Add(extraLines_.Rest());
   news_.outcome = run_.Outcome();
   changed_.wait(lock, [this] { return isLeft_ || isEndTaken_; });
@@ -104,8 +102,7 @@ bool RunFollower::ReadLog() {
     LogPiece lines = lines_.Cut(bytes);
     const std::lock_guard lock(mutex_);
     if (isLeft_) return false;
-    Understand(lines);
-    news_.log.Add(std::move(lines));
+    news_.log.Add(Understand(std::move(lines)));
   }
   return true;
 }
@@ -126,11 +123,14 @@ bool RunFollower::ReadExtraLog() {
   return true;
 }
 
-void RunFollower::Understand(const LogPiece& lines) {
+LogPiece RunFollower::Understand(LogPiece lines) {
+  std::vector<bool> isProgress(lines.Count());
+  bool hasProgress = false;
   for (std::size_t i = 0; i < lines.Count(); ++i) {
     const std::string_view line = lines.Line(i);
     if (std::optional<EngineProgress> progress = EngineProgressOf(line)) {
       news_.progress = std::move(progress);
+      isProgress[i] = hasProgress = true;
     } else if (messages_ < kMostMessages) {
       if (std::optional<EngineMessage> message = EngineMessageOf(line)) {
         ++messages_;
@@ -138,6 +138,14 @@ void RunFollower::Understand(const LogPiece& lines) {
       }
     }
   }
+  if (!hasProgress) return lines;
+  LogPiece others;
+  for (std::size_t i = 0; i < lines.Count(); ++i) {
+    if (isProgress[i]) continue;
+    others.Append(lines.Line(i));
+    others.EndLine();
+  }
+  return others;
 }
 
 }  // namespace tervane

@@ -18,7 +18,8 @@ namespace tervane {
 
 /// What a run has brought since somebody asked last.
 struct RunNews {
-  LogTail log, extraLog;
+  LogTail log;  ///< Without the lines of its progress.
+  LogTail extraLog;
   std::optional<EngineProgress> progress;  ///< The latest; nothing when there was none.
   std::vector<EngineMessage> messages;
   std::string trouble;  ///< A stop that could not be asked for.
@@ -49,7 +50,9 @@ class RunFollower {
   /// True when there is more to read at once.
   bool ReadLog();
   bool ReadExtraLog();
-  void Understand(const LogPiece& lines);
+  /// Takes what the engine says in them; gives the lines for the log, where those that only tell how far it is are
+  /// left out.
+  LogPiece Understand(LogPiece lines);
 
   SetupRun run_;
   LogReader log_;
