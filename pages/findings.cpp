@@ -2,11 +2,14 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/findings.h"
 
+#include <map>
+#include <tuple>
 #include <unordered_map>
 
 #include <fmt/format.h>
 
 #include "core/walked_node.h"
+#include "document/key_reference.h"
 
 namespace tervane {
 
@@ -152,6 +155,60 @@ SetupFinding FindingOf(const CYbSEDocument& document, const EngineMessage& messa
     finding.text = message.place + ": " + message.text;
   }
   return finding;
+}
+
+void AddEngineMessages(const CYbSEDocument& document, const std::vector<EngineMessage>& messages,
+                       const std::string& whyPast, std::vector<SetupFinding>& findings) {
+  using Kind = SetupFinding::Kind;
+  std::map<std::pair<std::uint64_t, std::string>, std::size_t> known;
+  for (std::size_t i = 0; i < findings.size(); ++i)
+    if (findings[i].serial != 0 && !findings[i].key.empty() && findings[i].kind <= Kind::Note)
+      known.try_emplace({findings[i].serial, findings[i].key}, i);
+  for (const EngineMessage& message : messages) {
+    SetupFinding said = FindingOf(document, message);
+    if (!whyPast.empty()) said.isPast = true, said.detail = whyPast;
+    const auto place = known.find({said.serial, said.key});
+    if (said.key.empty() || place == known.end()) {
+      findings.push_back(std::move(said));
+      continue;
+    }
+    // What the editor finds holds now, whatever an engine said before.
+    SetupFinding& same = findings[place->second];
+    if (said.isPast) continue;
+    same.kind = std::min(same.kind, said.kind);
+    if (said.text == same.text || said.text == same.detail) continue;
+    same.detail += fmt::format("{}the engine: {}", same.detail.empty() ? "" : "; ", said.text);
+  }
+}
+
+std::string FindingGroup::Text() const {
+  std::string text = First().text;
+  if (!First().detail.empty()) text += fmt::format(" ({})", First().detail);
+  if (!IsOne()) text += fmt::format(": {} places", findings.size());
+  return text;
+}
+
+std::string FindingGroup::Place() const {
+  const auto withKey = [&](const std::string& path) {
+    return First().key.empty() ? path : fmt::format("{}:{}", path, First().key);
+  };
+  return withKey(IsOne() ? First().path : NumberlessPath(First().path));
+}
+
+std::vector<FindingGroup> GroupFindings(std::vector<SetupFinding> findings) {
+  std::vector<FindingGroup> groups;
+  std::map<std::tuple<SetupFinding::Kind, std::string, std::string, std::string, std::string>, std::size_t> places;
+  for (SetupFinding& finding : findings) {
+    // What the file's reading met stands in lines of their own.
+    const bool isAlone = finding.line > 0;
+    const auto [place, isNew] = isAlone ? std::pair(places.end(), true)
+                                        : places.try_emplace({finding.kind, finding.text, finding.detail, finding.key,
+                                                              NumberlessPath(finding.path)},
+                                                             groups.size());
+    if (isNew) groups.emplace_back();
+    groups[isNew ? groups.size() - 1 : place->second].findings.push_back(std::move(finding));
+  }
+  return groups;
 }
 
 }  // namespace tervane

@@ -24,6 +24,7 @@ struct SetupFinding {
   int line = 0;              ///< Of the file that was read; 0 when it speaks of no line.
   std::uint64_t serial = 0;  ///< Of the node at the path, or of the nearest above it; 0 when there is none.
   KvfUnread::Kind unread{};  ///< What was not read.
+  bool isPast = false;       ///< An engine said it of the setup as it was.
 };
 
 /// "error", "warning", "note", "unread".
@@ -52,5 +53,23 @@ std::vector<FindingGroup> GroupsOf(const std::vector<SetupFinding>& findings);
 
 /// What an engine said of the setup. Where the setup has no such place, the text stands alone.
 SetupFinding FindingOf(const CYbSEDocument& document, const EngineMessage& message);
+/// Adds what an engine said; what it said of a key that has a finding joins that one. `whyPast` is empty, or tells why
+/// all that may hold no more.
+void AddEngineMessages(const CYbSEDocument& document, const std::vector<EngineMessage>& messages,
+                       const std::string& whyPast, std::vector<SetupFinding>& findings);
+
+/// Findings of one cause: the same is said of the same key at several like places.
+struct FindingGroup {
+  std::vector<SetupFinding> findings;  ///< At least one.
+
+  const SetupFinding& First() const { return findings.front(); }
+  bool IsOne() const { return findings.size() == 1; }
+  /// What is found, with the reason and, of several, with their number: "... does not cover the simulation: 50 places".
+  std::string Text() const;
+  /// The path and key; of several the path that they have in common.
+  std::string Place() const;
+};
+/// In the order of the first of each.
+std::vector<FindingGroup> GroupFindings(std::vector<SetupFinding> findings);
 
 }  // namespace tervane

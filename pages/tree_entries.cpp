@@ -24,11 +24,6 @@ class Place {
   std::string path_;
 };
 
-std::string ShortTitle(const CYbSEKvfBase& node) {
-  if (!node.GetAbbreviatedTitle().empty()) return node.GetAbbreviatedTitle();
-  return node.GetTitle().empty() ? StepName(node) : node.GetTitle();
-}
-
 void AddEntriesBelow(Place& place, int treeId, int depth, std::vector<TreeEntry>& entries) {
   for (CYbSEKvfBase* child = place.Node().GetFirstChild(); child; child = place.Node().GetNextChild(child)) {
     const PageClass* page = child->GetDlgRuntimeClass(treeId);
@@ -45,6 +40,11 @@ void AddEntriesBelow(Place& place, int treeId, int depth, std::vector<TreeEntry>
 }
 
 }  // namespace
+
+std::string ShortTitle(const CYbSEKvfBase& node) {
+  if (!node.GetAbbreviatedTitle().empty()) return node.GetAbbreviatedTitle();
+  return node.GetTitle().empty() ? StepName(node) : node.GetTitle();
+}
 
 std::vector<TreeEntry> TreeEntries(CYbSEKvfBase& root, int treeId) {
   std::vector<TreeEntry> entries;

@@ -13,10 +13,13 @@ namespace tervane {
 struct TreeEntry {
   CYbSEKvfBase* node;
   std::string path;   ///< As `NodePlace` has it.
-  std::string title;  ///< The node's abbreviated title, where it has none its title, or else its name in the path.
+  std::string title;  ///< As `ShortTitle` gives it.
   int depth;          ///< Number of entries above it.
   const PageClass* page;
 };
+
+/// The abbreviated title of a node, where it has none its title, or else its name in the path.
+std::string ShortTitle(const CYbSEKvfBase& node);
 
 /// The entries of a tree, parents first: the nodes below the root that have a page there and take part. What lies below
 /// a node without an entry hangs at the nearest entry above.

@@ -9,6 +9,7 @@
 
 #include "core/path.h"
 #include "forms/page.h"
+#include "pages/place_names.h"
 #include "pages/tree_entries.h"
 #include "platform/text.h"
 
@@ -16,51 +17,10 @@ namespace tervane {
 
 namespace {
 
-std::string_view WithoutColon(std::string_view label) {
-  label = Trimmed(label);
-  if (label.ends_with(':')) label.remove_suffix(1);
-  return Trimmed(label);
-}
-
-const std::string& TitleOf(const CYbSEKvfBase& node) {
-  return node.GetAbbreviatedTitle().empty() ? node.GetTitle() : node.GetAbbreviatedTitle();
-}
-
-/// What a control is called: by its label, without one by that of the control in front of it in its row.
-class Labels {
- public:
-  void Look(PageForm& form) {
-    form.ForEach([this](const Control& control) {
-      const std::string_view own = WithoutColon(control.label);
-      if (!own.empty()) before_ = own;
-      if (control.key.empty() || !control.node) return;
-      // A choice without a label belongs to what stands in front of it in its row.
-      const std::string label = !own.empty()     ? std::string(own)
-                                : control.beside ? fmt::format("The method of {}", before_)
-                                                 : std::string();
-      labels_.push_back({control.node, control.key, label});
-    });
-  }
-  /// Empty for a choice that has no label; nothing where no control has the key.
-  std::optional<std::string> Find(const BoundKeys::Place& place) const {
-    for (const auto& known : labels_)
-      if (known.node == place.node && known.key == place.key) return Replaced(known.label, "\n", " ");
-    return std::nullopt;
-  }
-
- private:
-  struct Known {
-    const CYbSEKvfBase* node;
-    std::string key, label;
-  };
-  std::vector<Known> labels_;
-  std::string before_;
-};
-
 /// Puts facts into words, each with the page that has its control.
 class Explainer {
  public:
-  explicit Explainer(CYbSEDocument& document) : document_(document) {}
+  explicit Explainer(CYbSEDocument& document) : document_(document), names_(document) {}
 
   /// `keys` know the members of the asking page; null elsewhere.
   Reason InWords(const ConditionFact& fact, const CYbSEKvfBase& asker, BoundKeys* keys = nullptr) {
@@ -91,9 +51,9 @@ class Explainer {
     reason.path = PathOf(*place->node);
     reason.key = place->key;
     CYbSEKvfBase* shown = PageNodeOf(*place->node, reason);
-    std::optional<std::string> label = shown ? LabelOf(*shown, *place) : std::nullopt;
-    if (!label) label = place->facts.label.empty() ? place->key : std::string(place->facts.label);
-    reason.text = Demand(*label, fact, place->facts);
+    const std::string label =
+        shown ? names_.LabelOf(*shown, *place->node, place->key, place->facts) : CalledBy(place->facts, place->key);
+    reason.text = Demand(label, fact, place->facts);
     return reason;
   }
 
@@ -114,29 +74,16 @@ class Explainer {
 
   /// The nearest node from here up whose page is shown.
   CYbSEKvfBase* PageNodeOf(const CYbSEKvfBase& node, Reason& reason) const {
-    for (CYbSEKvfBase* shown = FindNode(document_.Root(), ParseSetupPath(PathOf(node)).steps);
-         shown && shown->GetParent(); shown = shown->GetParent()) {
-      if (!PageClassOf(*shown)) continue;
-      reason.page = TitleOf(*shown);
-      reason.serial = shown->Serial();
-      return shown;
-    }
-    return nullptr;
-  }
-
-  std::optional<std::string> LabelOf(CYbSEKvfBase& shown, const BoundKeys::Place& place) {
-    auto found = labels_.find(&shown);
-    if (found == labels_.end()) {
-      found = labels_.emplace(&shown, Labels()).first;
-      const auto page = MakePageToRead(*PageClassOf(shown), shown, {document_, host_, {}});
-      if (page) found->second.Look(page->Form());
-    }
-    return found->second.Find(place);
+    CYbSEKvfBase* found = FindNode(document_.Root(), ParseSetupPath(PathOf(node)).steps);
+    CYbSEKvfBase* shown = found ? PlaceNames::PageNodeOf(*found) : nullptr;
+    if (!shown) return nullptr;
+    reason.page = ShortTitle(*shown);
+    reason.serial = shown->Serial();
+    return shown;
   }
 
   CYbSEDocument& document_;
-  NobodyToAsk host_;
-  std::unordered_map<const CYbSEKvfBase*, Labels> labels_;
+  PlaceNames names_;
 };
 
 void Explain(Explainer& explainer, CYbSEKvfBase& node, Explanation& why) {
@@ -158,7 +105,7 @@ std::string Explanation::Text(std::string_view yes, std::string_view no) const {
 
 Explanation WhyTakesPart(CYbSEDocument& document, CYbSEKvfBase& node) {
   Explainer explainer(document);
-  Explanation why{TitleOf(node), node.IsDataUsedInSetup() != 0, {}};
+  Explanation why{ShortTitle(node), node.IsDataUsedInSetup() != 0, {}};
   // Of a node that takes part all rules count, of one that does not those that say no.
   for (CYbSEKvfBase* above = &node; above && above->GetParent(); above = above->GetParent())
     if (why.holds || !above->IsDlgUsedInSetup()) Explain(explainer, *above, why);
@@ -167,9 +114,7 @@ Explanation WhyTakesPart(CYbSEDocument& document, CYbSEKvfBase& node) {
 
 Explanation WhyEnabled(CYbSEDocument& document, PageForm& form, const Control& control) {
   Explainer explainer(document);
-  Explanation why{std::string(WithoutColon(Replaced(control.label.empty() ? control.key : control.label, "\n", " "))),
-                  control.IsEnabled(),
-                  {}};
+  Explanation why{SpokenLabel(control.label.empty() ? control.key : control.label), control.IsEnabled(), {}};
   for (const ConditionFact& fact : control.enabledWhen.Why(*control.pageNode))
     why.reasons.push_back(explainer.InWords(fact, form.Node(), &form.Keys()));
   return why;
@@ -186,7 +131,7 @@ std::vector<MissingNode> WhatIsMissing(CYbSEDocument& document) {
         std::ranges::any_of(above, [&](const std::string& path) { return place.path.starts_with(path + "/"); });
     if (isBelow) return;
     above.push_back(place.path);
-    MissingNode node{place.path, place.node.Serial(), {TitleOf(place.node), false, {}}};
+    MissingNode node{place.path, place.node.Serial(), {ShortTitle(place.node), false, {}}};
     Explain(explainer, place.node, node.why);
     if (!node.why.reasons.empty()) missing.push_back(std::move(node));
   });
