@@ -15,7 +15,7 @@ using testing::Contains;
 using testing::Not;
 
 std::vector<std::string> Found(const SearchIndex& index, const char* typed, std::size_t most = 1000) {
-  constexpr const char* kKinds[] = {"title", "label", "option", "key"};
+  constexpr const char* kKinds[] = {"title", "label", "option", "key", "section"};
   std::vector<std::string> lines;
   for (const SearchHit& hit : index.Find(typed, most))
     lines.push_back(fmt::format("{} {}: {}", kKinds[static_cast<int>(hit.kind)], hit.path, hit.text));
@@ -39,9 +39,12 @@ TEST(Search, FindsTitlesLabelsOptionsAndKeysInAnyCase) {
       {"head change", "label SimSpec/CompControlParaOL: Maximum head change per iteration:"},  // in a group
       {"low-gradient flow reduction:",
        "label SimSpec/CompControlParaOL: Threshold gradient for applying low-gradient flow reduction:"},
-      {"filename", "option ExtraParams: Filename"},  // in a table
-      {"maxnoofiter", "key SimSpec/CompControlParaOL: MaxNoOfIter"},
-      {"paraol:maxno", "key SimSpec/CompControlParaOL: MaxNoOfIter"},
+      {"filename", "option ExtraParams: Filename"},                                       // in a table
+      {"maxnoofiter", "label SimSpec/CompControlParaOL: Maximum number of iterations:"},  // one hit for both
+      {"paraol:maxno", "label SimSpec/CompControlParaOL: Maximum number of iterations:"},
+      {"CompControlParaOL", "title SimSpec/CompControlParaOL: OL Computational Control Parameters"},
+      {"2d_data_file", "section Catchment/NDS_2D_DATA_FILE: NDS_2D_DATA_FILE"},  // without a page of its own
+      {"file:item_num", "key Catchment/NDS_2D_DATA_FILE: ITEM_NUMBERS"},
       {"noofparams", "key ExtraParams: NoOfParams"},                    // without a control
       {"start period", "label SimSpec/SimulationPeriod: Start Date:"},  // a word of the title
       {"particle mass", nullptr},                                       // takes no part
