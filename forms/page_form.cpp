@@ -71,6 +71,7 @@ Control& PageForm::AddBound(ControlKind kind, std::string label, const void* mem
   if (!place) return control;
   control.node = place->node;
   control.key = place->key;
+  control.isOfKey = true;
   control.unit = place->facts.unit;
   control.itemType = place->facts.itemType;
   std::vector<std::string> options;
@@ -201,6 +202,7 @@ Control& PageForm::Date(std::string label, CYbDateTime& value) {
   if (const BoundKeys::Place* place = keys_->Find(&value)) {
     control.node = place->node;
     control.key = place->key;
+    control.isOfKey = true;
   }
   return control;
 }

@@ -91,6 +91,7 @@ class Control {
   std::function<std::vector<std::string>()> offers;   ///< Of a text: what is offered; any other may be typed.
   std::vector<int> optionValues;           ///< What the node stores for each; empty for the options' numbers.
   std::string key;                         ///< Of the node, so that a finding leads here.
+  bool isOfKey = false;                    ///< The value is the key's as it stands, not made of it by functions.
   const CYbSEKvfBase* node = nullptr;      ///< That holds the key; null where it changes.
   const CYbSEKvfBase* pageNode = nullptr;  ///< Of the form, by whose place in the tree the rules are asked.
   Host::FileQuestion fileQuestion;         ///< Of a file name.
