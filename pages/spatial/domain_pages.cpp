@@ -7,6 +7,7 @@
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/domain_map.h"
 #include "pages/parts/file_controls.h"
+#include "pages/parts/projection_dialog.h"
 #include "platform/files.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
@@ -83,7 +84,7 @@ void CCatchmentDlg::Describe(PageForm& form) {
       .DefaultExtension("nds2")
       .ShownWhen(fromGrid)
       .RevalidatesLater();
-  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(fromGrid);
+  form.Button("View", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(fromGrid);
   form.Button("Create...",
               [this] {
                 if (!MayCreateFile(Context())) return;
@@ -145,13 +146,24 @@ void CCatchmentDlg::Describe(PageForm& form) {
       .ToolTip("Takes X0 and Y0 from a click on the map")
       .EnabledWhen(fromShape);
   GridNumber(grid, "Rotation:", n.rotationShp, &GridGeometry::rotation);
+  // Shown by its name; any text that tells a coordinate system may be typed.
   grid.Text(
-          "Map Projection Type:", [&n] { return n.GetModelGeometry().projection; },
+          "Map Projection Type:", [&n] { return CYbMapProjection(n.GetModelGeometry().projection).Name(); },
           [&n](const std::string& text) { n.MapProjShp = text; })
       .Key("MapProjShp")
       .EnabledWhen(fromShape)
       .RevalidatesLater();
-  grid.Shown("", [&n] { return CYbMapProjection(n.GetModelGeometry().projection).Name(); });
+  grid.Button("Choose...",
+              [this] {
+                if (const auto chosen = ProjectionDialog(Context(), Node(), Node().MapProjShp).Run()) {
+                  Node().MapProjShp = *chosen;
+                  Node().SetRevalidateAll();
+                  UpdateDoc(kDataChanged, "Choose Coordinate System");
+                }
+              })
+      .Beside()
+      .ToolTip("Finds a coordinate system by its name, EPSG code or place")
+      .EnabledWhen(fromShape);
 
   form.Map([this] { return Map(); });
 }
