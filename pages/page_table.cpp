@@ -17,6 +17,7 @@
 #include "pages/surface/overland_pages.h"
 #include "pages/surface/river_pages.h"
 #include "pages/surface/vegetation_pages.h"
+#include "pages/whole_pages.h"
 
 namespace tervane {
 
@@ -28,6 +29,7 @@ struct PageFile {
   std::span<const PageRow> (*rows)();
 };
 constexpr PageFile kFiles[] = {
+    {"document", WholePages},
     {"document", DocumentPages},  {"simspec", ComponentsPages}, {"simspec", ControlPages},
     {"simspec", PeriodPages},     {"spatial", Data2DPages},     {"spatial", DomainPages},
     {"spatial", StationPages},    {"spatial", ZonePages},       {"surface", ClimatePages},

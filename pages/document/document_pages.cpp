@@ -16,7 +16,6 @@
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "platform/units.h"
-#include "simspec/pages.h"
 
 namespace tervane {
 
@@ -91,17 +90,6 @@ std::string CTvnHelpView::PageText(std::string& problem) const {
   else if (!file.empty())
     problem = ReadWholeFile(file, content).error;
   return content.data ? std::string(content.Text()) : std::string(*FindHelpPage(PageName()));
-}
-
-void COverviewDlg::Initialize() {
-  Node().Lines.clear();
-  Node().Text.clear();
-  if (Node().GetRoot() && GenerateOverview(*Node().GetRoot(), Node().Lines)) Node().Text = OverviewText(Node().Lines);
-  PageOf::Initialize();
-}
-
-void COverviewDlg::Describe(PageForm& form) {
-  form.TextView("", [this] { return Node().Text; });
 }
 
 void CDisplayDlg::SetData() {
@@ -184,8 +172,6 @@ void CDisplayDlg::Import() {
 namespace {
 
 constexpr PageRow kPages[] = {
-    PageIs<CTvnHelpView, CYbSEKvfBase>(kHelpPage),
-    PageIs<COverviewDlg, COverviewKvf>(kOverviewPage),
     PageIs<CCoverageDlg, CCoverageKvf>(kCoveragePage),
     PageIs<CDisplayDlg, COverlaysKvf>(kDisplayPage),
 };

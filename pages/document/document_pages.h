@@ -4,7 +4,6 @@
 
 #include <span>
 
-#include "document/overview.h"
 #include "forms/page_rows.h"
 #include "overlays/overlays.h"
 
@@ -32,16 +31,6 @@ class CTvnHelpView : public PageOf<CYbSEKvfBase> {
   std::string PageText(std::string& problem) const;
 };
 
-/// The whole setup as a text to read.
-class COverviewDlg : public PageOf<COverviewKvf> {
- public:
-  using PageOf::PageOf;
-  void Initialize() override;
-
- protected:
-  void Describe(PageForm& form) override;
-};
-
 /// What the maps show.
 class CDisplayDlg : public PageOf<COverlaysKvf> {
  public:
@@ -56,7 +45,7 @@ class CDisplayDlg : public PageOf<COverlaysKvf> {
   void Import();
 };
 
-/// The pages of the document as a whole: help, overview, coverage, display.
+/// The pages of the document as a whole: coverage and display.
 std::span<const PageRow> DocumentPages();
 
 }  // namespace tervane

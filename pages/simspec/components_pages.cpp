@@ -94,7 +94,10 @@ void CBasicParaDlg::Describe(PageForm& form) {
   std::vector<std::shared_ptr<PageForm>> forms{ModelCompForm(form, *n.Important(kModelComponents))};
   for (const int engine : {kEngineModflowSurfact, kEngineModflow96, kEngineModflow2000})
     forms.push_back(ModModelCompForm(form, *n.Important(kModflowComponents), engine));
-  form.SubForms(std::move(forms), [this] { return shown_; });
+  form.SubForms(std::move(forms), [this] {
+    SetData();  // also of a page that is only read
+    return shown_;
+  });
 }
 
 void DescribeWaterQualityComponents(PageForm& form, CModelCompWQKvf& n) {

@@ -1,0 +1,45 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/whole_pages.h"
+
+#include "pages/overview_lines.h"
+#include "simspec/introduction.h"
+#include "simspec/pages.h"
+
+namespace tervane {
+
+CIntroductionDlg::CIntroductionDlg(CYbSEKvfBase& node, PageContext context)
+    : CTvnHelpView(node, std::move(context)), summary_(*this) {}
+
+void CIntroductionDlg::Describe(PageForm& form) {
+  summary_.Describe(form);
+  CTvnHelpView::Describe(form);
+}
+
+void COverviewDlg::Initialize() {
+  Node().Lines = OverviewInWords(Context().document);
+  Node().Text = OverviewText(Node().Lines);
+  PageOf::Initialize();
+}
+
+void COverviewDlg::Describe(PageForm& form) {
+  form.TextView("", [this] { return Node().Text; });
+}
+
+namespace {
+
+std::unique_ptr<CYbSEDlgBase> MakeHelpPage(CYbSEKvfBase& node, PageContext context) {
+  if (dynamic_cast<const CIntroductionKvf*>(&node)) return std::make_unique<CIntroductionDlg>(node, std::move(context));
+  return std::make_unique<CTvnHelpView>(node, std::move(context));
+}
+
+constexpr PageRow kPages[] = {
+    {kHelpPage, MakeHelpPage},
+    PageIs<COverviewDlg, COverviewKvf>(kOverviewPage),
+};
+
+}  // namespace
+
+std::span<const PageRow> WholePages() { return kPages; }
+
+}  // namespace tervane
