@@ -14,7 +14,9 @@ class ChangesDialog : public QDialog {
   Q_OBJECT
 
  public:
-  ChangesDialog(const std::vector<SetupDifference>& differences, bool maySave, QWidget* parent);
+  /// What a save would do; none where the file cannot be written.
+  enum class Save { No, Yes, OverAnother };
+  ChangesDialog(const std::vector<SetupDifference>& differences, Save saves, QWidget* parent);
 };
 
 }  // namespace tervane

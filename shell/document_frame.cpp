@@ -18,6 +18,7 @@
 #include "document/view_settings.h"
 #include "forms/page.h"
 #include "pages/findings.h"
+#include "pages/place_names.h"
 #include "pages/tree_entries.h"
 #include "shell/find_panel.h"
 #include "shell/findings_view.h"
@@ -37,11 +38,10 @@ namespace tervane {
 
 namespace {
 
-constexpr int kTreeWidth = 250, kPageWidth = 750, kPageHeight = 480, kBottomHeight = 110;
+constexpr int kTreeWidth = 270, kPageWidth = 750, kPageHeight = 480, kBottomHeight = 110;
 constexpr int kAutosaveDelay = 2000;      ///< Milliseconds after the last change.
 constexpr int kDiskInterval = 3000;       ///< Milliseconds between looks at the file on disk.
 constexpr int kProcessedInterval = 1000;  ///< The same at the preprocessor's report.
-constexpr int kFindingsDelay = 300;       ///< Milliseconds for which messages of an engine gather.
 constexpr std::size_t kMostVisited = 200;
 
 CYbSEKvfBase* NodeBelow(CYbSEKvfBase& node, std::uint64_t serial) {
@@ -49,6 +49,17 @@ CYbSEKvfBase* NodeBelow(CYbSEKvfBase& node, std::uint64_t serial) {
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
     if (CYbSEKvfBase* found = NodeBelow(*child, serial)) return found;
   return nullptr;
+}
+
+/// Where a page stands: "Setup Data > Climate".
+QString PlaceText(CYbSEKvfBase& node) {
+  QStringList steps{node.GetDlgRuntimeClass(kSetupDataTree)       ? DocumentFrame::tr("Setup Data")
+                    : node.GetDlgRuntimeClass(kProcessedDataTree) ? DocumentFrame::tr("Processed Data")
+                    : node.GetDlgRuntimeClass(kResultsTree)       ? DocumentFrame::tr("Results")
+                                                                  : DocumentFrame::tr("Tools")};
+  if (node.GetParent())
+    for (const std::string& title : PlaceNames::TitlesTo(*node.GetParent())) steps << Translated(title);
+  return steps.join(" > ");
 }
 
 }  // namespace
@@ -90,21 +101,30 @@ void DocumentFrame::BuildBody() {
   builtZoom_ = theme.Zoom();
   treeTabs_ = new QTabWidget;
   treeTabs_->setDocumentMode(true);
+  // Where the trees are narrow their names are cut, and all three can be chosen.
+  treeTabs_->setElideMode(Qt::ElideRight);
+  treeTabs_->setUsesScrollButtons(false);
   const auto tree = [&](int id, const QString& title, const QString& emptyText) {
     auto* made = new NodeTree(id, emptyText);
     treeTabs_->addTab(made, title);
     trees_.push_back(made);
     connect(made, &NodeTree::NodeChosen, this, [this](quint64 serial) { GoTo(serial); });
     connect(made, &NodeTree::WhyAsked, this, &DocumentFrame::ShowWhyHere);
+    connect(made, &NodeTree::TabbedOn, this, &DocumentFrame::FocusNextPane);
   };
   trees_.clear();
   tree(kSetupDataTree, tr("Setup Data"), tr("No part of the setup takes part."));
   tree(kProcessedDataTree, tr("Processed Data"),
        tr("Nothing yet: the preprocessor has left no report beside this setup."));
   tree(kResultsTree, tr("Results"), tr("Nothing yet: no simulation has left results for this setup."));
+  connect(treeTabs_, &QTabWidget::tabBarClicked, this, [this](int tab) {
+    if (tab >= 0) ShowTree(tab);
+  });
   find_ = new FindPanel(session_->Document(), treeTabs_);
-  connect(find_, &FindPanel::HitChosen, this,
-          [this](quint64 serial, const QString& control) { GoTo(serial, FromQt(control)); });
+  connect(find_, &FindPanel::HitChosen, this, [this](quint64 serial, const QString& control) {
+    // Where the text names no control the first one takes what is typed.
+    if (GoTo(serial, FromQt(control)) && control.isEmpty() && page_) page_->FocusOn({});
+  });
   connect(find_, &FindPanel::Left, this, [this] { treeTabs_->currentWidget()->setFocus(); });
 
   pagePlace_ = new QWidget;
@@ -113,7 +133,7 @@ void DocumentFrame::BuildBody() {
 
   bottomTabs_ = new QTabWidget;
   bottomTabs_->setDocumentMode(true);
-  findings_ = new FindingsView;
+  findings_ = new FindingsView(session_->Document());
   connect(findings_, &FindingsView::FindingChosen, this,
           [this](const SetupFinding& finding) { GoTo(finding.serial, finding.key); });
   bottomTabs_->addTab(findings_, tr("Findings"));
@@ -128,7 +148,6 @@ void DocumentFrame::BuildBody() {
   below->setContentsMargins(0, 0, 0, 0);
   below->setSpacing(0);
   below->addWidget(bottomTabs_, 1);
-  below->addWidget(new RunPanel(*run_));
 
   rows_ = new QSplitter(Qt::Vertical);
   rows_->addWidget(pagePlace_);
@@ -142,13 +161,17 @@ void DocumentFrame::BuildBody() {
   columns_->setStretchFactor(1, 1);
   columns_->setSizes({theme.Scaled(kTreeWidth + 30), theme.Scaled(kPageWidth)});
   columns_->setChildrenCollapsible(false);
-  all_->addWidget(columns_, 1);
+  all_->insertWidget(0, columns_, 1);
+  // All bars stand at the foot.
+  delete runPanel_;
+  all_->addWidget(runPanel_ = new RunPanel(*run_));
 }
 
 void DocumentFrame::Redraw() {
   Commit();
   const QByteArray layout = SaveLayout();
   const std::uint64_t current = current_;
+  const QStringList branches = Branches();
   const int tab = treeTabs_->currentIndex(), bottom = bottomTabs_->currentIndex();
   delete columns_;
   current_ = 0;
@@ -156,6 +179,7 @@ void DocumentFrame::Redraw() {
   RestoreLayout(layout);
   treeTabs_->setCurrentIndex(tab);
   bottomTabs_->setCurrentIndex(bottom);
+  RestoreBranches(branches);
   Refresh(kDataChanged);
   isGoing_ = true;
   GoTo(current);
@@ -202,7 +226,7 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
   const PageClass* pageClass = PageClassOf(node);
   PageContext context{session_->Document(), host_,
                       [this, &node](int hint, const std::string& action, const void* source) {
-                        session_->UpdateDoc(node, hint, action, source);
+                        session_->UpdateDoc(node, hint, action, source, page_ ? page_->NameOf(source) : std::string());
                       }};
   context.displayUnits = &program_.Units();
   context.isReplacement = isRebuilding_;
@@ -226,7 +250,7 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
     page_->hide();
     page_->deleteLater();
   }
-  page_ = new PageView(std::move(made), ToQt(PathOf(node)));
+  page_ = new PageView(std::move(made), PlaceText(node), ToQt(PathOf(node)));
   connect(page_, &PageView::WhyAsked, this, [this](const Control* asked) {
     ShowWhy(tr("Why Is This Grey?"), {WhyEnabled(session_->Document(), page_->Page().Form(), *asked)},
             tr("can be changed, since"), tr("cannot be changed, since"));
@@ -325,59 +349,15 @@ void DocumentFrame::StepFinding(int by) {
 void DocumentFrame::FocusNextPane() {
   const QWidget* focus = QApplication::focusWidget();
   const auto holds = [focus](const QWidget* pane) { return focus && (pane == focus || pane->isAncestorOf(focus)); };
-  if (holds(find_) && page_)
+  if (holds(find_) && page_) {
     page_->FocusOn({});
-  else if (holds(pagePlace_))
+    // A page may have nothing that takes the keyboard.
+    if (QApplication::focusWidget() == focus) bottomTabs_->currentWidget()->setFocus();
+  } else if (holds(pagePlace_)) {
     bottomTabs_->currentWidget()->setFocus();
-  else
+  } else {
     treeTabs_->currentWidget()->setFocus();
-}
-
-// ---- Processed data
-
-void DocumentFrame::RebuildProcessedData() {
-  CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
-  if (!report) return;
-  auto* processed = session_->Document().Root().Important(kProcessedData);
-  const CYbSEKvfBase* shown = NodeOf(current_);
-  const bool isShown = shown == processed || (shown && NodeBelow(*processed, current_));
-  std::string place;
-  if (isShown) {
-    place = shown == processed && !lostPage_.empty() ? lostPage_ : PathOf(*shown);
-    // Pages speak of nodes: this one goes before its node does.
-    delete page_;
-    current_ = 0;
   }
-  report->Load();
-  ShowProcessedDataNews();
-  Refresh(kItemDeleted | kItemAdded | kTreeRebuilt | kRefreshPlots | kDataChanged);
-  if (!isShown) return;
-  isRebuilding_ = isGoing_ = true;
-  const bool isThere = GoToPath(place);
-  lostPage_ = isThere ? std::string() : place;
-  if (!isThere) GoTo(processed->Serial());
-  if (place_ >= 0) visited_[static_cast<std::size_t>(place_)] = current_;
-  isRebuilding_ = isGoing_ = false;
-}
-
-void DocumentFrame::CheckProcessedData() {
-  // The pages of an open dialog or menu may be those that would be taken away.
-  if (QApplication::activeModalWidget() || QApplication::activePopupWidget()) return;
-  const CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
-  if (!report) return;
-  using OnDisk = CPreprocessedDataManager::OnDisk;
-  const OnDisk state = report->CheckDisk();
-  if (state == OnDisk::Changed) return RebuildProcessedData();
-  if (isReportGone_ == (state == OnDisk::Gone)) return;
-  isReportGone_ = state == OnDisk::Gone;
-  if (page_) page_->Sync();
-}
-
-void DocumentFrame::ShowProcessedDataNews() {
-  const CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
-  const std::string problem = report ? report->Problem() : std::string();
-  if (problem != toldProblem_ && !problem.empty()) Log(tr("Processed data: %1").arg(ToQt(problem)));
-  toldProblem_ = problem;
 }
 
 // ---- Editing
@@ -394,65 +374,6 @@ void DocumentFrame::Refresh(int hint) {
   emit StateChanged();
 }
 
-void DocumentFrame::ShowFindings() {
-  findingsLater_.stop();
-  std::vector<SetupFinding> findings = FindingsOf(session_->Document());
-  for (const EngineMessage& message : run_->Messages()) {
-    SetupFinding finding = FindingOf(session_->Document(), message);
-    // An engine checks what the editor checks too.
-    const bool isKnown = std::ranges::any_of(findings, [&](const SetupFinding& known) {
-      return known.path == finding.path && known.key == finding.key && known.text == finding.text;
-    });
-    if (!isKnown) findings.push_back(std::move(finding));
-  }
-  findings_->Show(std::move(findings));
-  const int count = findings_->Count();
-  bottomTabs_->setTabText(bottomTabs_->indexOf(findings_), count ? tr("Findings (%1)").arg(count) : tr("Findings"));
-}
-
-// ---- The run
-
-void DocumentFrame::FollowRun() {
-  findingsLater_.setSingleShot(true);
-  findingsLater_.setInterval(kFindingsDelay);
-  connect(&findingsLater_, &QTimer::timeout, this, &DocumentFrame::ShowFindings);
-  connect(run_.get(), &DocumentRun::Begun, this, [this] {
-    bottomTabs_->setCurrentWidget(log_);
-    riverLog_->Follow();
-    emit StateChanged();
-  });
-  connect(run_.get(), &DocumentRun::Moved, this, [this] {
-    log_->Follow();
-    riverLog_->Follow();
-  });
-  connect(run_.get(), &DocumentRun::MessagesCame, this, [this] {
-    if (!findingsLater_.isActive()) findingsLater_.start();
-  });
-  connect(run_.get(), &DocumentRun::Ended, this, &DocumentFrame::OnRunEnd);
-}
-
-void DocumentFrame::OnRunEnd(bool isDone, bool wasFound) {
-  ShowFindings();
-  delete runBanner_;
-  QString text = run_->Sentence();
-  if (wasFound) text = tr("A run of this setup that was not started here: %1").arg(text);
-  std::vector<Banner::Answer> answers{{tr("Show the &Log"), [this] { bottomTabs_->setCurrentWidget(log_); }}};
-  if (!isDone && !run_->Messages().empty())
-    answers.push_back({tr("Show the &Findings"), [this] { bottomTabs_->setCurrentWidget(findings_); }});
-  runBanner_ = new Banner(text, answers);
-  AddBanner(runBanner_);
-  QApplication::alert(this);
-  CheckProcessedData();
-  emit StateChanged();
-}
-
-void DocumentFrame::Settle() {
-  run_->Settle();
-  ShowFindings();
-}
-
-// ---- Editing
-
 void DocumentFrame::RefreshPlots() {
   Commit();
   if (page_) page_->Page().OnRefresh();
@@ -463,14 +384,22 @@ void DocumentFrame::Commit() {
   if (page_) page_->Commit();
 }
 
-void DocumentFrame::Undo() {
-  Commit();
-  session_->Undo();
-}
+void DocumentFrame::Undo() { Step(&EditSession::Undo, &UndoStack::UndoPlace, &UndoStack::UndoName, tr("Undone: %1")); }
 
 void DocumentFrame::Redo() {
+  Step(&EditSession::Redo, &UndoStack::RedoPlace, &UndoStack::RedoName, tr("Done again: %1"));
+}
+
+void DocumentFrame::Step(bool (EditSession::*step)(), StepPlace (UndoStack::*placeOf)() const,
+                         std::string (UndoStack::*nameOf)() const, const QString& told) {
   Commit();
-  session_->Redo();
+  if (page_) page_->DropRefused();
+  const StepPlace place = (session_->Steps().*placeOf)();
+  const std::string name = (session_->Steps().*nameOf)();
+  if (!(*session_.*step)()) return;
+  // A command of the menus has no page: what it has changed is seen where it stands.
+  if (GoTo(place.node) && page_) page_->PointOut(place.control);
+  emit Told(told.arg(Translated(name)));
 }
 
 void DocumentFrame::Change(CYbSEKvfBase& node, int hint, const QString& action) {
@@ -512,14 +441,14 @@ void DocumentFrame::ShowLoadReport() {
                   "beside the new one.")
                    .arg(written)
                    .arg(CFlowModelDocVersionKvf::kWrittenVersion),
-               {{tr("&What will be saved…"), [this] { emit ChangesWanted(); }}});
+               {{tr("What will &be saved…"), [this] { emit ChangesWanted(); }}});
   }
   if (report.unread.empty()) return;
   ShowBanner(
       tr("Things in this file that the editor does not know: %1. They are listed below; the first save keeps the "
          "file as it was beside the new one.")
           .arg(report.unread.size()),
-      {{tr("&What will be saved…"), [this] { emit ChangesWanted(); }}});
+      {{tr("What will &be saved…"), [this] { emit ChangesWanted(); }}});
 }
 
 void DocumentFrame::CheckDisk() {
@@ -530,7 +459,7 @@ void DocumentFrame::CheckDisk() {
   const bool isGone = state == EditSession::OnDisk::Gone;
   std::vector<Banner::Answer> answers;
   if (!isGone) {
-    answers.push_back({tr("&Reload"), [this] { emit ReloadWanted(); }});
+    answers.push_back({tr("Re&load"), [this] { emit ReloadWanted(); }});
     answers.push_back({tr("&Differences…"), [this] { emit ChangesWanted(); }});
   }
   answers.push_back({tr("&Keep Mine"), [this] { session_->AcceptDisk(); }});
@@ -569,6 +498,16 @@ void DocumentFrame::RestoreLayout(const QByteArray& layout) {
   };
   restore(*columns_, columns, 0);
   restore(*rows_, rows, 1);
+}
+
+QStringList DocumentFrame::Branches() const {
+  QStringList branches;
+  for (const NodeTree* tree : trees_) branches << tree->Branches();
+  return branches;
+}
+
+void DocumentFrame::RestoreBranches(const QStringList& branches) {
+  for (NodeTree* tree : trees_) tree->RestoreBranches(branches);
 }
 
 }  // namespace tervane

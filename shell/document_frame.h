@@ -3,14 +3,17 @@
 #pragma once
 
 #include <QPointer>
+#include <QStringList>
 #include <QTimer>
 #include <QWidget>
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "document/edit_session.h"
+#include "pages/findings.h"
 #include "pages/why.h"
 #include "shell/widgets/banner.h"
 
@@ -28,6 +31,7 @@ class NodeTree;
 class PageView;
 class Program;
 class QtHost;
+class RunPanel;
 
 /// One document in its tab: the trees at the left, the page in the middle, findings and logs below.
 class DocumentFrame : public QWidget {
@@ -91,6 +95,9 @@ class DocumentFrame : public QWidget {
 
   QByteArray SaveLayout() const;
   void RestoreLayout(const QByteArray& layout);
+  /// The branches of the trees that the user has opened and closed, to be given to a later window of the setup.
+  QStringList Branches() const;
+  void RestoreBranches(const QStringList& branches);
 
  signals:
   /// The title, the place, or what can be undone is another one.
@@ -98,11 +105,16 @@ class DocumentFrame : public QWidget {
   void SaveAsWanted();
   void ReloadWanted();
   void ChangesWanted();
+  /// Something for the status line.
+  void Told(const QString& text);
   /// A data file is to be shown in a viewer.
   void DataFileWanted(const QString& path);
 
  private:
   void BuildBody();
+  /// Undoes or redoes a step, and shows what that has changed.
+  void Step(bool (EditSession::*step)(), StepPlace (UndoStack::*placeOf)() const,
+            std::string (UndoStack::*nameOf)() const, const QString& told);
   void ShowWhyHere(quint64 serial);
   void ShowWhy(const QString& title, const std::vector<Explanation>& explanations, const QString& yes,
                const QString& no);
@@ -123,6 +135,14 @@ class DocumentFrame : public QWidget {
   void FollowRun();
   void ShowFindings();
   void OnRunEnd(bool isDone, bool wasFound);
+  /// The first error that the engine has told in its latest run, as a sentence with its place and how many there are.
+  struct ToldError {
+    SetupFinding finding;
+    QString text;
+  };
+  std::optional<ToldError> FirstError() const;
+  /// Shows a tree with the page that was shown last of it, else its first one.
+  void ShowTree(int tab);
 
   std::unique_ptr<EditSession> session_;
   QString name_;
@@ -143,6 +163,7 @@ class DocumentFrame : public QWidget {
   QWidget* pagePlace_ = nullptr;
   QPointer<PageView> page_;
   QPointer<Banner> diskBanner_, runBanner_;
+  QPointer<RunPanel> runPanel_;
 
   std::uint64_t current_ = 0;
   std::vector<std::uint64_t> above_;    ///< The nodes above the one that is shown, nearest first.

@@ -20,6 +20,12 @@ namespace {
 
 constexpr std::size_t kMostHits = 200;
 
+QString TreeName(int tree) {
+  return tree == kProcessedDataTree ? FindPanel::tr("Processed Data")
+         : tree == kResultsTree     ? FindPanel::tr("Results")
+                                    : FindPanel::tr("Setup Data");
+}
+
 }  // namespace
 
 FindPanel::FindPanel(CYbSEDocument& document, QWidget* trees) : document_(document) {
@@ -82,8 +88,14 @@ void FindPanel::Find() {
   list_->clear();
   for (const SearchHit& hit : hits_) {
     auto* item = new QTreeWidgetItem(list_);
-    const QString title = Translated(hit.title);
-    item->setText(0, hit.kind == SearchHit::Kind::Title ? title : QString("%1\n%2").arg(Translated(hit.text), title));
+    const QString title = Translated(hit.title), tree = TreeName(hit.tree);
+    const bool isTitle = hit.kind == SearchHit::Kind::Title;
+    // A name that leads to a label stands behind it, so that it is seen why.
+    const bool isByKey = hit.kind == SearchHit::Kind::Label && !ToQt(hit.text).contains(typed, Qt::CaseInsensitive) &&
+                         ToQt(hit.key).contains(typed, Qt::CaseInsensitive);
+    QString text = isTitle ? title : Translated(hit.text);
+    if (isByKey) text += QString(" (%1)").arg(ToQt(hit.key));
+    item->setText(0, QString("%1\n%2").arg(text, isTitle ? tree : QString("%1 · %2").arg(title, tree)));
     item->setToolTip(0, ToQt(hit.key.empty() ? hit.path : hit.path + ":" + hit.key));
   }
   count_->setText(hits_.empty()               ? tr("Nothing found.")

@@ -24,6 +24,17 @@ QString PathText(const SetupFinding& finding) {
   return ToQt(finding.key.empty() ? finding.path : finding.path + ":" + finding.key);
 }
 
+QString FindingText(const SetupFinding& finding) {
+  const QString text = Translated(finding.text).simplified();
+  return finding.detail.empty() ? text : text + " — " + ToQt(finding.detail);
+}
+
+void CollectNodes(CYbSEKvfBase& node, std::unordered_map<std::uint64_t, CYbSEKvfBase*>& wanted) {
+  if (const auto found = wanted.find(node.Serial()); found != wanted.end()) found->second = &node;
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+    CollectNodes(*child, wanted);
+}
+
 QString KindText(SetupFinding::Kind kind) {
   switch (kind) {
     case SetupFinding::Kind::Error:
@@ -41,13 +52,13 @@ QString KindText(SetupFinding::Kind kind) {
 bool SameFindings(const std::vector<SetupFinding>& a, const std::vector<SetupFinding>& b) {
   return std::ranges::equal(a, b, [](const SetupFinding& x, const SetupFinding& y) {
     return x.kind == y.kind && x.serial == y.serial && x.path == y.path && x.key == y.key && x.text == y.text &&
-           x.detail == y.detail && x.line == y.line;
+           x.detail == y.detail && x.line == y.line && x.isPast == y.isPast;
   });
 }
 
 }  // namespace
 
-FindingsView::FindingsView() {
+FindingsView::FindingsView(CYbSEDocument& document) : document_(document) {
   setRootIsDecorated(false);
   setUniformRowHeights(true);
   setAlternatingRowColors(true);
@@ -61,55 +72,117 @@ FindingsView::FindingsView() {
   setItemDelegate(new RowDelegate(this));
   connect(this, &QTreeWidget::itemClicked, this, [this](QTreeWidgetItem* item) { Choose(item); });
   connect(this, &QTreeWidget::itemActivated, this, [this](QTreeWidgetItem* item) { Choose(item); });
+  connect(this, &QTreeWidget::itemExpanded, this, &FindingsView::Fill);
+}
+
+FindingsView::Nodes FindingsView::NodesOfFindings() const {
+  Nodes nodes;
+  for (const SetupFinding& finding : findings_)
+    if (finding.serial) nodes.emplace(finding.serial, nullptr);
+  if (!nodes.empty()) CollectNodes(document_.Root(), nodes);
+  return nodes;
+}
+
+QTreeWidgetItem* FindingsView::NewLine(const SetupFinding& finding, const QString& place, const QString& text) const {
+  auto* item = new QTreeWidgetItem;
+  const bool isError = finding.kind == SetupFinding::Kind::Error;
+  const bool isWarning = finding.kind == SetupFinding::Kind::Warning;
+  item->setIcon(kKindColumn, Theme::Get().Icon(isError ? "error" : isWarning ? "warning" : "note"));
+  item->setText(kKindColumn, KindText(finding.kind));
+  item->setText(kPlaceColumn, place.isEmpty() ? PathText(finding) : place);
+  item->setText(kTextColumn, text);
+  item->setToolTip(kTextColumn, text);
+  item->setToolTip(kPlaceColumn, PathText(finding));
+  if (finding.line > 0) item->setText(kLineColumn, QString::number(finding.line));
+  if (finding.isPast)
+    for (int column = 0; column < columnCount(); ++column) item->setForeground(column, Theme::Get().QuietColor());
+  return item;
 }
 
 void FindingsView::Show(std::vector<SetupFinding> findings) {
-  // The worst first; what the file's reading left stands behind what can be mended on a page.
-  std::ranges::stable_sort(findings, {}, &SetupFinding::kind);
+  // The worst first; what the file's reading left stands behind what can be mended on a page, what may hold no more
+  // behind all.
+  std::ranges::stable_sort(findings, {},
+                           [](const SetupFinding& finding) { return std::pair(finding.isPast, finding.kind); });
   if (SameFindings(findings, findings_)) return;
   findings_ = std::move(findings);
+  // Groups that were opened stay open.
+  std::vector<std::string> opened;
+  for (int row = 0; row < topLevelItemCount(); ++row)
+    if (topLevelItem(row)->isExpanded()) opened.push_back(groups_[static_cast<std::size_t>(row)].Place());
   clear();
+  groups_ = GroupFindings(findings_);
+  const Nodes nodes = NodesOfFindings();
+  PlaceNames names(document_);
+  const auto nodeOf = [&](const SetupFinding& finding) { return finding.serial ? nodes.at(finding.serial) : nullptr; };
   QList<QTreeWidgetItem*> items;
-  for (const SetupFinding& finding : findings_) {
-    auto* item = new QTreeWidgetItem;
-    const bool isError = finding.kind == SetupFinding::Kind::Error;
-    const bool isWarning = finding.kind == SetupFinding::Kind::Warning;
-    item->setIcon(kKindColumn, Theme::Get().Icon(isError ? "error" : isWarning ? "warning" : "note"));
-    item->setText(kKindColumn, KindText(finding.kind));
-    item->setText(kPlaceColumn, PathText(finding));
-    QString text = Translated(finding.text).simplified();
-    if (!finding.detail.empty()) text += " — " + ToQt(finding.detail);
-    item->setText(kTextColumn, text);
-    item->setToolTip(kTextColumn, text);
-    item->setToolTip(kPlaceColumn, PathText(finding));
-    if (finding.line > 0) item->setText(kLineColumn, QString::number(finding.line));
-    items << item;
+  for (const FindingGroup& group : groups_) {
+    const SetupFinding& first = group.First();
+    CYbSEKvfBase* node = nodeOf(first);
+    // What the file holds and no node knows has its path alone.
+    const bool isKnown = node && first.kind != SetupFinding::Kind::Unread;
+    if (group.IsOne()) {
+      items << NewLine(first, isKnown ? ToQt(names.Of(*node, first.path, first.key)) : QString(), FindingText(first));
+      continue;
+    }
+    std::vector<CYbSEKvfBase*> all;
+    for (const SetupFinding& finding : group.findings) all.push_back(nodeOf(finding));
+    QTreeWidgetItem* line = NewLine(first, ToQt(PlaceNames::OfAll(all)),
+                                    tr("%1: %2 places").arg(FindingText(first)).arg(group.findings.size()));
+    line->setToolTip(kPlaceColumn, ToQt(group.Place()));
+    line->setChildIndicatorPolicy(QTreeWidgetItem::ShowIndicator);
+    items << line;
   }
   addTopLevelItems(items);
+  setRootIsDecorated(std::ranges::any_of(groups_, [](const FindingGroup& group) { return !group.IsOne(); }));
+  for (int row = 0; row < topLevelItemCount(); ++row)
+    if (std::ranges::find(opened, groups_[static_cast<std::size_t>(row)].Place()) != opened.end())
+      topLevelItem(row)->setExpanded(true);
   const bool hasLines = std::ranges::any_of(findings_, [](const SetupFinding& finding) { return finding.line > 0; });
   setColumnHidden(kLineColumn, !hasLines);
   resizeColumnToContents(kPlaceColumn);
-  setColumnWidth(kPlaceColumn, std::min(columnWidth(kPlaceColumn), Theme::Get().Scaled(300)));
+  setColumnWidth(kPlaceColumn, std::min(columnWidth(kPlaceColumn), Theme::Get().Scaled(340)));
+}
+
+void FindingsView::Fill(QTreeWidgetItem* item) {
+  const int row = indexOfTopLevelItem(item);
+  if (row < 0 || item->childCount() > 0) return;
+  const Nodes nodes = NodesOfFindings();
+  PlaceNames names(document_);
+  for (const SetupFinding& finding : groups_[static_cast<std::size_t>(row)].findings) {
+    CYbSEKvfBase* node = finding.serial ? nodes.at(finding.serial) : nullptr;
+    item->addChild(
+        NewLine(finding, node ? ToQt(names.Of(*node, finding.path, finding.key)) : QString(), FindingText(finding)));
+  }
 }
 
 int FindingsView::Count() const {
   return static_cast<int>(std::ranges::count_if(findings_, [](const SetupFinding& finding) {
-    return finding.kind == SetupFinding::Kind::Error || finding.kind == SetupFinding::Kind::Warning;
+    return !finding.isPast &&
+           (finding.kind == SetupFinding::Kind::Error || finding.kind == SetupFinding::Kind::Warning);
   }));
 }
 
 void FindingsView::Step(int by) {
   if (findings_.empty()) return;
-  const int count = topLevelItemCount();
-  const int current = currentItem() ? indexOfTopLevelItem(currentItem()) : (by > 0 ? -1 : count);
-  setCurrentItem(topLevelItem((current + by + count) % count));
-  Choose(currentItem());
+  QTreeWidgetItem* next = !currentItem() ? nullptr : by > 0 ? itemBelow(currentItem()) : itemAbove(currentItem());
+  // An open group is stepped through; behind the last line comes the first.
+  if (!next && by > 0) next = topLevelItem(0);
+  if (!next) {
+    next = topLevelItem(topLevelItemCount() - 1);
+    if (next->isExpanded()) next = next->child(next->childCount() - 1);
+  }
+  setCurrentItem(next);
+  Choose(next);
 }
 
 void FindingsView::Choose(QTreeWidgetItem* item) {
-  const int row = indexOfTopLevelItem(item);
-  if (row >= 0 && row < static_cast<int>(findings_.size()))
-    emit FindingChosen(SetupFinding(findings_[static_cast<std::size_t>(row)]));
+  if (!item) return;
+  const int group = indexOfTopLevelItem(item->parent() ? item->parent() : item);
+  const int place = item->parent() ? item->parent()->indexOfChild(item) : 0;
+  if (group < 0) return;
+  // A copy: the list may be another one before its place is shown.
+  emit FindingChosen(SetupFinding(groups_[static_cast<std::size_t>(group)].findings[static_cast<std::size_t>(place)]));
 }
 
 void FindingsView::paintEvent(QPaintEvent* event) {

@@ -3,23 +3,26 @@
 #pragma once
 
 #include <QTreeWidget>
+#include <unordered_map>
 #include <vector>
 
 #include "pages/findings.h"
+#include "pages/place_names.h"
 
 namespace tervane {
 
-/// All that is wrong in a setup, as a list; choosing one leads to its place.
+/// All that is wrong in a setup, as a list; choosing one leads to its place. Findings of one cause are one line with
+/// their number, which opens.
 class FindingsView : public QTreeWidget {
   Q_OBJECT
 
  public:
-  FindingsView();
+  explicit FindingsView(CYbSEDocument& document);
 
   void Show(std::vector<SetupFinding> findings);
-  /// The number of errors and warnings.
+  /// The number of errors and warnings that hold now.
   int Count() const;
-  /// Chooses the next or the previous one.
+  /// Chooses the next or the previous line.
   void Step(int by);
 
  signals:
@@ -30,9 +33,17 @@ class FindingsView : public QTreeWidget {
   void contextMenuEvent(QContextMenuEvent* event) override;
 
  private:
-  void Choose(QTreeWidgetItem* item);
+  using Nodes = std::unordered_map<std::uint64_t, CYbSEKvfBase*>;
 
+  void Choose(QTreeWidgetItem* item);
+  QTreeWidgetItem* NewLine(const SetupFinding& finding, const QString& place, const QString& text) const;
+  /// Makes the lines of a group when it is first opened.
+  void Fill(QTreeWidgetItem* item);
+  Nodes NodesOfFindings() const;
+
+  CYbSEDocument& document_;
   std::vector<SetupFinding> findings_;
+  std::vector<FindingGroup> groups_;  ///< One for each line that stands at the left.
 };
 
 }  // namespace tervane

@@ -182,6 +182,11 @@ void LibraryTab::CheckDisk() {
   if (editor_.Reload().empty()) Sync();
 }
 
+void LibraryTab::Reload() {
+  if (const std::string problem = editor_.Reload(); !problem.empty()) host_.ShowMessage(problem, Host::Icon::Error);
+  Sync();
+}
+
 void LibraryTab::Redraw() {
   BuildPage();
   Sync();

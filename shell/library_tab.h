@@ -37,6 +37,8 @@ class LibraryTab : public QWidget {
   bool Save(const std::string& path);
   /// Follows another program that has changed the file, unless there are changes to save.
   void CheckDisk();
+  /// Reads the file again and throws the changes away that were not saved; the user is told when it cannot be read.
+  void Reload();
   /// Makes all anew that was computed from colours and sizes.
   void Redraw();
 

@@ -14,6 +14,7 @@
 #include <QStatusBar>
 #include <QTabWidget>
 #include <QToolBar>
+#include <QToolButton>
 
 #include "document/coverage_board.h"
 #include "document/edit_session.h"
@@ -73,7 +74,7 @@ MainWindow::Command& MainWindow::Add(QMenu* menu, const QString& text, const cha
   action->setShortcut(keys);
   if (menu) menu->addAction(action);
   connect(action, &QAction::triggered, this, std::move(run));
-  return *commands_.emplace_back(std::make_unique<Command>(Command{action, icon, {}, {}}));
+  return *commands_.emplace_back(std::make_unique<Command>(Command{action, QString(text).remove('&'), icon, {}, {}}));
 }
 
 MainWindow::Command& MainWindow::AddForDocument(QMenu* menu, const QString& text, const char* icon,
@@ -127,6 +128,7 @@ void MainWindow::BuildMenus() {
       [this](DocumentFrame&) { SaveDocumentAs(); }, [this](LibraryTab&) { SaveLibraryAs(); });
   AddForDocument(file, tr("&What will be saved…"), nullptr, QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_S),
                  [this](DocumentFrame& frame) { ShowChanges(frame); });
+  AddForDocument(file, tr("Com&pare With…"), nullptr, {}, [this](DocumentFrame& frame) { Compare(frame); });
   file->addSeparator();
   Command& closeTab =
       Add(file, tr("&Close"), nullptr, QKeySequence::Close, [this] { CloseTab(tabs_->currentWidget()); });
@@ -184,7 +186,7 @@ void MainWindow::BuildEditMenu() {
   forward(tr("Fill &Down\tCtrl+D"), "fillDown");
   edit->addSeparator();
   AddForDocument(edit, tr("&Find…"), "find", QKeySequence::Find, [](DocumentFrame& frame) { frame.StartFind(); });
-  AddForDocument(edit, tr("Copy &Path"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C),
+  AddForDocument(edit, tr("Copy Pat&h"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C),
                  [](DocumentFrame& frame) { QApplication::clipboard()->setText(ToQt(frame.CurrentPath())); });
   standardBar_->addActions({undo.action, redo.action});
   standardBar_->addSeparator();
@@ -218,11 +220,11 @@ void MainWindow::BuildViewMenu() {
   AddForDocument(view, tr("&Overview"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_I),
                  [](DocumentFrame& frame) { GoToImportant(frame, kOverview); });
   view->addSeparator();
-  AddForDocument(view, tr("Next F&inding"), nullptr, QKeySequence(Qt::Key_F8),
+  AddForDocument(view, tr("&Next Finding"), nullptr, QKeySequence(Qt::Key_F8),
                  [](DocumentFrame& frame) { frame.StepFinding(1); });
   AddForDocument(view, tr("&Previous Finding"), nullptr, QKeySequence(Qt::SHIFT | Qt::Key_F8),
                  [](DocumentFrame& frame) { frame.StepFinding(-1); });
-  Command& marks = AddForDocument(view, "Show Validation Icons", nullptr, {}, [](DocumentFrame& frame) {
+  Command& marks = AddForDocument(view, "Show &Validation Icons", nullptr, {}, [](DocumentFrame& frame) {
     CViewSettingsKvf& settings = ViewSettingsOf(frame);
     settings.ShowValidationIcons = settings.ShowValidationIcons ? 0 : 1;
     frame.Change(settings, kDataChanged, tr("Show Validation Icons"));
@@ -230,11 +232,11 @@ void MainWindow::BuildViewMenu() {
   marks.checked = [this] { return Frame() && ViewSettingsOf(*Frame()).ShowValidationIcons != 0; };
   view->addSeparator();
   Command& zoomIn =
-      Add(view, tr("Zoom &In"), nullptr, QKeySequence::ZoomIn, [this] { SetZoom(Theme::Get().Zoom() + 0.1); });
+      Add(view, tr("&Zoom In"), nullptr, QKeySequence::ZoomIn, [this] { SetZoom(Theme::Get().Zoom() + 0.1); });
   // Where the plus sign needs the shift key.
   zoomIn.action->setShortcuts({QKeySequence(QKeySequence::ZoomIn), QKeySequence(Qt::CTRL | Qt::Key_Equal)});
   Add(view, tr("Zoom O&ut"), nullptr, QKeySequence::ZoomOut, [this] { SetZoom(Theme::Get().Zoom() - 0.1); });
-  Add(view, tr("&Actual Size"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_0), [this] { SetZoom(1); });
+  Add(view, tr("Actual &Size"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_0), [this] { SetZoom(1); });
   QMenu* looks = view->addMenu(tr("App&earance"));
   auto* group = new QActionGroup(this);
   const auto look = [&](const QString& text, Theme::Appearance appearance) {
@@ -258,29 +260,44 @@ void MainWindow::BuildRunMenu() {
   });
   refresh.enabled = [this] { return tabs_->count() > 0; };
   refresh.action->setToolTip(tr("Refresh graphic"));
-  // In a menu bar an icon would take the text's place.
-  Command& refreshInBar = Add(nullptr, tr("R&efresh"), nullptr, {}, [&refresh] { refresh.action->trigger(); });
+  // In a menu bar an icon would take the text's place, and its letter is that of the edit menu.
+  Command& refreshInBar = Add(nullptr, tr("Refre&sh"), nullptr, {}, [&refresh] { refresh.action->trigger(); });
   refreshInBar.enabled = refresh.enabled;
   menuBar()->addAction(refreshInBar.action);
 
   QMenu* run = menuBar()->addMenu(tr("&Run"));
   const auto flag = [&](const QString& text, int CExecuteEngineFlagsKvf::*member) -> Command& {
-    Command& command = AddForDocument(run, text, nullptr, {},
-                                      [this, member, text](DocumentFrame& frame) { ToggleFlag(frame, member, text); });
+    Command& command = AddForDocument(
+        run, text, nullptr, {},
+        [this, member, name = QString(text).remove('&')](DocumentFrame& frame) { ToggleFlag(frame, member, name); });
     command.checked = [this, member] { return Frame() && FlagsOf(*Frame()).*member != 0; };
     return command;
   };
-  flag(tr("Preprocessing"), &CExecuteEngineFlagsKvf::PP);
-  flag(tr("Water movement"), &CExecuteEngineFlagsKvf::WM);
-  Command& quality = flag(tr("Water quality"), &CExecuteEngineFlagsKvf::WQ);
+  flag(tr("&Preprocessing"), &CExecuteEngineFlagsKvf::PP);
+  flag(tr("&Water movement"), &CExecuteEngineFlagsKvf::WM);
+  Command& quality = flag(tr("Water &quality"), &CExecuteEngineFlagsKvf::WQ);
   quality.enabled = [this] { return Frame() && HasWaterQuality(*Frame()); };
   quality.checked = [this] { return Frame() && HasWaterQuality(*Frame()) && FlagsOf(*Frame()).WQ != 0; };
   run->addSeparator();
   const auto execute = [](DocumentFrame& frame, const char* argument) {
     frame.Session().Document().RunEngine(argument);
   };
-  Command& all = AddForDocument(run, tr("Execute..."), nullptr, {}, [=](DocumentFrame& frame) { execute(frame, ""); });
+  Command& all = AddForDocument(run, tr("E&xecute..."), nullptr, QKeySequence(Qt::Key_F9),
+                                [=](DocumentFrame& frame) { execute(frame, ""); });
   all.enabled = [this] { return Frame() && Frame()->Session().Document().IsExecuting() == 0; };
+  // A key with Shift would hide the progress.
+  const auto part = [&](const QString& text, const QString& shortText, const char* icon, const char* argument,
+                        const QKeySequence& keys) {
+    Command& command = AddForDocument(run, text, icon, keys, [=](DocumentFrame& frame) { execute(frame, argument); });
+    command.action->setIconText(shortText);
+    command.action->setToolTip(command.name);
+    return command.action;
+  };
+  QAction* preprocessor = part(tr("Run p&reprocessor only"), tr("Preprocessor"), "run_preprocessor", "/PP",
+                               QKeySequence(Qt::CTRL | Qt::Key_F9));
+  QAction* movement = part(tr("Run water &movement only"), tr("Water movement"), "run_water_movement", "/WM", {});
+  QAction* waterQuality = part(tr("R&un water quality only"), tr("Water quality"), "run_water_quality", "/WQ", {});
+  run->addSeparator();
   const auto whileExecuting = [&](const QString& text, void (DocumentRun::*operation)()) {
     Command& command =
         AddForDocument(run, text, nullptr, {}, [operation](DocumentFrame& frame) { (frame.Run().*operation)(); });
@@ -293,14 +310,13 @@ void MainWindow::BuildRunMenu() {
 
   modelBar_->addAction(refresh.action);
   modelBar_->addSeparator();
-  const auto button = [&](const QString& text, const char* icon, const char* argument) {
-    Command& command = AddForDocument(nullptr, text, icon, {}, [=](DocumentFrame& frame) { execute(frame, argument); });
-    modelBar_->addAction(command.action);
-  };
-  button(tr("Run preprocessor only"), "run_preprocessor", "/PP");
-  button(tr("Run water movement only"), "run_water_movement", "/WM");
+  modelBar_->addActions({preprocessor, movement});
   modelBar_->addSeparator();
-  button(tr("Run water quality only"), "run_water_quality", "/WQ");
+  modelBar_->addAction(waterQuality);
+  // What is run is read beside its picture.
+  for (QAction* action : {preprocessor, movement, waterQuality})
+    if (auto* button = qobject_cast<QToolButton*>(modelBar_->widgetForAction(action)))
+      button->setToolButtonStyle(Qt::ToolButtonTextBesideIcon);
 }
 
 void MainWindow::ToggleFlag(DocumentFrame& frame, int CExecuteEngineFlagsKvf::*flag, const QString& action) {
@@ -325,8 +341,9 @@ void MainWindow::BuildHelpMenu() {
     for (const auto& command : commands_)
       if (!command->action->shortcut().isEmpty())
         rows += QString("<tr><td>%1&nbsp;&nbsp;</td><td>%2</td></tr>")
-                    .arg(command->action->shortcut().toString(QKeySequence::NativeText),
-                         command->action->text().remove('&').toHtmlEscaped());
+                    .arg(QKeySequence::listToString(command->action->shortcuts(), QKeySequence::NativeText)
+                             .replace("; ", ", "),
+                         command->name.toHtmlEscaped());
     const std::pair<QString, QString> ofWidgets[] = {
         {"Esc", tr("In a field: back to the value of the setup")},
         {tr("Up, Down"), tr("In a date: count the part at the cursor")},

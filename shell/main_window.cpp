@@ -24,6 +24,7 @@
 #include "platform/files.h"
 #include "platform/text_fields.h"
 #include "shell/changes_dialog.h"
+#include "shell/compare_dialog.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
 #include "shell/library_tab.h"
@@ -39,6 +40,8 @@ namespace {
 
 constexpr const char* kSetupFilter = "Tervane  Flow Model(*.tvd)|*.tvd|All Files (*.*)|*||";
 constexpr const char *kGeometry = "Window/Geometry", *kState = "Window/State", *kFrameLayout = "Window/Panes";
+
+constexpr int kToldFor = 8000;  ///< Milliseconds for which the status line tells something.
 
 bool IsDataFile(const QString& path) {
   const QString suffix = QFileInfo(path).suffix().toLower();
@@ -128,6 +131,7 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   if (!isNew) program_.AddRecentFile(ToQt(session->Path()));
   auto* frame = new DocumentFrame(std::move(session), name, host_, program_);
   frame->RestoreLayout(program_.Settings().value(kFrameLayout).toByteArray());
+  frame->RestoreBranches(program_.Branches(ToQt(frame->Session().Path())));
   frame->Run().SetSaver([this, frame] {
     tabs_->setCurrentWidget(frame);
     return SaveDocument();
@@ -137,6 +141,7 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   connect(
       frame, &DocumentFrame::ReloadWanted, this, [this, frame] { ReloadDocument(frame); }, Qt::QueuedConnection);
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
+  connect(frame, &DocumentFrame::Told, this, [this](const QString& text) { statusBar()->showMessage(text, kToldFor); });
   connect(frame, &DocumentFrame::DataFileWanted, this, &MainWindow::ShowDataFile);
   tabs_->setCurrentIndex(tabs_->addTab(frame, frame->Title()));
   frame->FocusNextPane();
@@ -169,7 +174,7 @@ bool MainWindow::OpenDocument(const QString& path) {
     const QString time = QLocale().toString(QDateTime::fromSecsSinceEpoch(
         std::chrono::duration_cast<std::chrono::seconds>(recovery->time.time_since_epoch()).count()));
     frame->ShowBanner(tr("Changes to this setup that were never saved are left from %1.").arg(time),
-                      {{tr("&Recover"),
+                      {{tr("Re&cover"),
                         [this, frame, recovery = *recovery] {
                           QTimer::singleShot(0, this, [this, frame, recovery] {
                             if (!CloseDocument(frame)) return;
@@ -180,7 +185,7 @@ bool MainWindow::OpenDocument(const QString& path) {
                               host_.ShowMessage(why, Host::Icon::Error);
                           });
                         }},
-                       {tr("&Throw Away"), [this, recovery = *recovery] {
+                       {tr("Throw &Away"), [this, recovery = *recovery] {
                           std::string why;
                           if (!DiscardRecovery(recovery, why)) host_.ShowMessage(why, Host::Icon::Error);
                         }}});
@@ -216,12 +221,26 @@ bool MainWindow::SaveDocument() {
   frame->Commit();
   EditSession& session = frame->Session();
   if (session.Path().empty() || session.IsReadOnly()) return SaveDocumentAs();
-  if (session.CheckDisk() == EditSession::OnDisk::Changed) {
-    const QString question = tr("Another program has changed %1 since it was read. Save over it?").arg(frame->Name());
-    if (host_.Ask(FromQt(question), Host::Icon::Warning, Host::Buttons::YesNo) != Host::Answer::Yes) return false;
-    session.AcceptDisk();
-  }
+  if (session.CheckDisk() == EditSession::OnDisk::Changed) return SaveBesideChange(*frame);
   return frame->Save(session.Path());
+}
+
+bool MainWindow::SaveBesideChange(DocumentFrame& frame) {
+  const auto answer = host_.Choose(tr("Another program has changed %1 since it was read.").arg(frame.Name()),
+                                   tr("The differences tell what your save would take back. To reload is to lose your "
+                                      "own changes; saved under another name, both stay."),
+                                   {tr("&Differences…"), tr("&Reload"), tr("Save &As…")});
+  if (!answer) return false;
+  switch (*answer) {
+    case 0:
+      return ShowChanges(frame);
+    case 1:
+      // Later: who wants the save still works with the document.
+      emit frame.ReloadWanted();
+      return false;
+    default:
+      return SaveDocumentAs();
+  }
 }
 
 bool MainWindow::SaveDocumentAs() {
@@ -298,8 +317,13 @@ bool MainWindow::SaveLibrary() {
   if (!library) return false;
   library->Commit();
   if (library->Editor().IsOtherOnDisk()) {
-    const QString question = tr("Another program has changed %1 since it was read. Save over it?").arg(library->Name());
-    if (host_.Ask(FromQt(question), Host::Icon::Warning, Host::Buttons::YesNo) != Host::Answer::Yes) return false;
+    const auto answer = host_.Choose(tr("Another program has changed %1 since it was read.").arg(library->Name()),
+                                     tr("To reload is to lose your own changes, to save over it those of the other "
+                                        "program; saved under another name, both stay."),
+                                     {tr("&Reload"), tr("Save &As…"), tr("Save &Over It")});
+    if (answer == 0) library->Reload();
+    if (answer == 1) return SaveLibraryAs();
+    if (answer != 2) return false;
   }
   return library->Save(library->Path());
 }
@@ -329,7 +353,7 @@ bool MainWindow::CloseLibrary(LibraryTab* library) {
 void MainWindow::ReloadDocument(DocumentFrame* frame) {
   const QString path = ToQt(frame->Session().Path());
   const std::string place = frame->CurrentPath();
-  if (frame->Session().IsModified() &&
+  if (frame->Session().IsModified() && frame->Session().HasChangesToSave() &&
       host_.Ask(FromQt(tr("Throw your own changes to %1 away and read the file again?").arg(frame->Name())),
                 Host::Icon::Warning, Host::Buttons::YesNo) != Host::Answer::Yes) {
     frame->CheckDisk();
@@ -346,16 +370,37 @@ void MainWindow::ReloadDocument(DocumentFrame* frame) {
   SyncCommands();
 }
 
-void MainWindow::ShowChanges(DocumentFrame& frame) {
+bool MainWindow::ShowChanges(DocumentFrame& frame) {
   frame.Commit();
+  EditSession& session = frame.Session();
+  const bool isOther = session.CheckDisk() == EditSession::OnDisk::Changed;
+  const FileStamp seen = StampOf(session.Path());
   std::string error;
-  const std::vector<SetupDifference> differences = frame.Session().WhatWillBeSaved(error);
+  const std::vector<SetupDifference> differences = session.WhatWillBeSaved(error);
   if (!error.empty()) {
     host_.ShowMessage(error, Host::Icon::Error);
+    return false;
+  }
+  using Save = ChangesDialog::Save;
+  ChangesDialog dialog(differences, session.IsReadOnly() ? Save::No : isOther ? Save::OverAnother : Save::Yes, this);
+  if (dialog.exec() != QDialog::Accepted) return false;
+  // What came after the look is asked for anew.
+  if (isOther && StampOf(session.Path()) == seen) session.AcceptDisk();
+  return SaveDocument();
+}
+
+void MainWindow::Compare(DocumentFrame& frame) {
+  const auto path = host_.AskFileToOpen({"Compare With", kSetupFilter, "tvd", frame.Session().Path()});
+  if (!path) return;
+  auto other = std::make_unique<CFlowModelDoc>();
+  if (!other->OnOpenDocument(*path)) {
+    host_.ShowMessage(other->Error(), Host::Icon::Error);
     return;
   }
-  ChangesDialog dialog(differences, !frame.Session().IsReadOnly(), this);
-  if (dialog.exec() == QDialog::Accepted) SaveDocument();
+  CompareDialog dialog(frame.Session(), frame.Name(), std::move(other), this);
+  connect(&dialog, &CompareDialog::PlaceChosen, &frame,
+          [&frame](const QString& place) { frame.GoToPath(FromQt(place)); });
+  dialog.exec();
 }
 
 bool MainWindow::CloseTab(QWidget* tab) {
@@ -370,7 +415,7 @@ bool MainWindow::CloseDocument(DocumentFrame* frame) {
   if (!frame) return true;
   tabs_->setCurrentWidget(frame);
   frame->Commit();
-  if (frame->Session().IsModified()) {
+  if (frame->Session().HasChangesToSave()) {
     const int answer = AskForChanges(frame->Name(), this);
     if (answer == QMessageBox::Save && !SaveDocument()) return false;
     if (answer != QMessageBox::Save && answer != QMessageBox::Discard) return false;
@@ -382,6 +427,8 @@ bool MainWindow::CloseDocument(DocumentFrame* frame) {
                 Host::Icon::Question, Host::Buttons::YesNo) != Host::Answer::Yes)
     return false;
   program_.Settings().setValue(kFrameLayout, frame->SaveLayout());
+  if (const std::string& path = frame->Session().Path(); !path.empty())
+    program_.KeepBranches(ToQt(path), frame->Branches());
   delete frame;
   SyncCommands();
   return true;

@@ -74,6 +74,7 @@ class MainWindow : public QMainWindow {
   /// An action that is enabled only while its rule holds, and checked as its other rule says.
   struct Command {
     QAction* action;
+    QString name;  ///< Without the letter's mark, and without what the action names besides.
     const char* icon;
     std::function<bool()> enabled;
     std::function<bool()> checked;
@@ -101,7 +102,12 @@ class MainWindow : public QMainWindow {
   DataViewer* Viewer() const;
   DocumentFrame* AddFrame(std::unique_ptr<EditSession> session);
   void ReloadDocument(DocumentFrame* frame);
-  void ShowChanges(DocumentFrame& frame);
+  /// Shows what a save would change; true when the user has then saved.
+  bool ShowChanges(DocumentFrame& frame);
+  /// Shows the document beside a setup that the user chooses.
+  void Compare(DocumentFrame& frame);
+  /// Asks what is to be done about a file that another program has changed; true when the document is saved then.
+  bool SaveBesideChange(DocumentFrame& frame);
   void CopyToKeyboardWidget(const char* operation);
   void ToggleFlag(DocumentFrame& frame, int CExecuteEngineFlagsKvf::*flag, const QString& action);
   void ChooseEngineFolder();

@@ -9,7 +9,9 @@
 #include <QPainter>
 #include <QSignalBlocker>
 #include <algorithm>
-#include <set>
+#include <array>
+#include <functional>
+#include <map>
 
 #include "pages/tree_entries.h"
 #include "shell/widgets/qt_text.h"
@@ -20,8 +22,10 @@ namespace tervane {
 
 namespace {
 
-enum ItemRole { kSerialRole = Qt::UserRole, kPathRole, kMarkRole };
-enum Mark { kNoMark, kWarningBelow, kErrorBelow, kWarning, kError };
+constexpr int kMostOpen = 12;  ///< A branch of more entries begins closed, and tells their number.
+
+enum ItemRole { kSerialRole = Qt::UserRole, kPathRole, kMarkRole, kShownMarkRole, kSharedRole };
+enum Mark { kNoMark, kWarning, kError };
 
 /// Rows whose marks stand at their right end, so that no title moves when one comes.
 class MarkedRowDelegate : public RowDelegate {
@@ -34,6 +38,12 @@ class MarkedRowDelegate : public RowDelegate {
     option->decorationPosition = QStyleOptionViewItem::Right;
   }
 };
+
+/// Stands in several trees.
+bool IsShared(const CYbSEKvfBase& node) {
+  return std::ranges::count_if(std::array{kSetupDataTree, kProcessedDataTree, kResultsTree},
+                               [&](TreeId tree) { return node.GetDlgRuntimeClass(tree) != nullptr; }) > 1;
+}
 
 /// The worst of a node's own findings.
 Mark OwnMark(const CYbSEKvfBase& node) {
@@ -60,8 +70,12 @@ NodeTree::NodeTree(int treeId, QString emptyText) : treeId_(treeId), emptyText_(
   setItemDelegate(new MarkedRowDelegate(this));
   setFrameShape(QFrame::NoFrame);
   setTextElideMode(Qt::ElideRight);
+  connect(this, &QTreeWidget::itemExpanded, this, &NodeTree::ShowMark);
+  connect(this, &QTreeWidget::itemCollapsed, this, &NodeTree::ShowMark);
   connect(this, &QTreeWidget::currentItemChanged, this, [this](QTreeWidgetItem* item) {
-    if (item) emit NodeChosen(item->data(0, kSerialRole).toULongLong());
+    if (!item) return;
+    Keep(*item);
+    emit NodeChosen(item->data(0, kSerialRole).toULongLong());
   });
 }
 
@@ -76,13 +90,12 @@ void NodeTree::Sync(CYbSEKvfGlobalBase& root, bool showMarks) {
   if (entries != entries_) {
     const QSignalBlocker blocker(this);
     // Nodes that were made anew are known by their paths.
-    std::set<quint64> closed, known;
-    std::set<QString> closedPaths;
+    std::map<quint64, bool> isOpen;
+    std::map<QString, bool> isPathOpen;
     for (const QTreeWidgetItem* item : items_) {
-      known.insert(item->data(0, kSerialRole).toULongLong());
-      if (item->childCount() == 0 || item->isExpanded()) continue;
-      closed.insert(item->data(0, kSerialRole).toULongLong());
-      closedPaths.insert(item->data(0, kPathRole).toString());
+      if (item->childCount() == 0) continue;
+      isOpen[item->data(0, kSerialRole).toULongLong()] = item->isExpanded();
+      isPathOpen[item->data(0, kPathRole).toString()] = item->isExpanded();
     }
     const quint64 current = currentItem() ? currentItem()->data(0, kSerialRole).toULongLong() : 0;
     clear();
@@ -96,33 +109,82 @@ void NodeTree::Sync(CYbSEKvfGlobalBase& root, bool showMarks) {
       items_.push_back(item);
     }
     for (std::size_t i = 0; i < items_.size(); ++i) {
-      const bool isClosed = known.contains(entries[i].serial) ? closed.contains(entries[i].serial)
-                                                              : closedPaths.contains(ToQt(found[i].path));
-      items_[i]->setExpanded(!isClosed);
+      if (items_[i]->childCount() == 0) continue;
+      const QString path = ToQt(found[i].path);
+      const auto known = isOpen.find(entries[i].serial);
+      const auto knownPath = isPathOpen.find(path);
+      items_[i]->setExpanded(known != isOpen.end()           ? known->second
+                             : knownPath != isPathOpen.end() ? knownPath->second
+                                                             : BeginsClosed(*items_[i]) == toggled_.contains(path));
     }
     entries_ = std::move(entries);
     Select(current);
     viewport()->update();
   }
 
-  const Theme& theme = Theme::Get();
-  const QIcon error = theme.Icon("error"), warning = theme.Icon("warning");
-  std::vector<Mark> marks(found.size(), kNoMark);
   for (std::size_t i = 0; i < found.size(); ++i) {
-    items_[i]->setText(0, Translated(found[i].title));
-    items_[i]->setData(0, kPathRole, ToQt(found[i].path));
-    marks[i] = showMarks ? MarkOf(*found[i].node, withEntry) : kNoMark;
-  }
-  for (std::size_t i = 0; i < found.size(); ++i) {
-    // An entry that is closed shows what it hides.
-    const Mark mark = marks[i];
-    if (items_[i]->data(0, kMarkRole).toInt() == mark && items_[i]->data(0, kMarkRole).isValid()) continue;
-    items_[i]->setData(0, kMarkRole, mark);
-    items_[i]->setIcon(0, mark == kError ? error : mark == kWarning ? warning : QIcon());
+    QTreeWidgetItem* item = items_[i];
+    const QString title = Translated(found[i].title);
+    item->setText(0, BeginsClosed(*item) ? QString("%1 (%2)").arg(title).arg(item->childCount()) : title);
+    item->setData(0, kPathRole, ToQt(found[i].path));
+    item->setData(0, kSharedRole, IsShared(*found[i].node));
+    item->setData(0, kMarkRole, showMarks ? MarkOf(*found[i].node, withEntry) : kNoMark);
     QStringList texts;
     for (const Finding& finding : found[i].node->Findings()) texts << Translated(finding.text);
-    items_[i]->setToolTip(0, texts.join("\n"));
+    // A title that is cut can be read there.
+    item->setToolTip(0, texts.isEmpty() ? title : texts.join("\n"));
   }
+  for (QTreeWidgetItem* item : items_) ShowMark(item);
+}
+
+bool NodeTree::BeginsClosed(const QTreeWidgetItem& item) { return item.childCount() > kMostOpen; }
+
+void NodeTree::ShowMark(QTreeWidgetItem* item) const {
+  const std::function<int(const QTreeWidgetItem*)> worst = [&](const QTreeWidgetItem* at) {
+    int mark = at->data(0, kMarkRole).toInt();
+    for (int child = 0; child < at->childCount(); ++child) mark = std::max(mark, worst(at->child(child)));
+    return mark;
+  };
+  const int mark = item->isExpanded() ? item->data(0, kMarkRole).toInt() : worst(item);
+  const QVariant shown = item->data(0, kShownMarkRole);
+  if (shown.isValid() && shown.toInt() == mark) return;
+  item->setData(0, kShownMarkRole, mark);
+  item->setIcon(0, mark == kNoMark ? QIcon() : Theme::Get().Icon(mark == kError ? "error" : "warning"));
+}
+
+QStringList NodeTree::Branches() const {
+  QStringList branches;
+  for (const QTreeWidgetItem* item : items_)
+    if (item->childCount() > 0 && item->isExpanded() == BeginsClosed(*item))
+      branches << item->data(0, kPathRole).toString();
+  return branches;
+}
+
+void NodeTree::RestoreBranches(const QStringList& branches) {
+  toggled_ = {branches.begin(), branches.end()};
+  for (QTreeWidgetItem* item : items_)
+    if (item->childCount() > 0)
+      item->setExpanded(BeginsClosed(*item) == toggled_.contains(item->data(0, kPathRole).toString()));
+}
+
+void NodeTree::Keep(const QTreeWidgetItem& item) {
+  if (!item.data(0, kSharedRole).toBool()) latest_ = item.data(0, kPathRole).toString();
+}
+
+bool NodeTree::HasOwn() const {
+  return std::ranges::any_of(items_, [](const QTreeWidgetItem* item) { return !item->data(0, kSharedRole).toBool(); });
+}
+
+bool NodeTree::IsAtOwn() const { return currentItem() && !currentItem()->data(0, kSharedRole).toBool(); }
+
+void NodeTree::ChooseLatest() {
+  QTreeWidgetItem *first = nullptr, *latest = nullptr;
+  for (QTreeWidgetItem* item : items_) {
+    if (item->data(0, kSharedRole).toBool()) continue;
+    if (!first) first = item;
+    if (!latest_.isEmpty() && item->data(0, kPathRole).toString() == latest_) latest = item;
+  }
+  if (QTreeWidgetItem* chosen = latest ? latest : first ? first : topLevelItem(0)) setCurrentItem(chosen);
 }
 
 QTreeWidgetItem* NodeTree::ItemOf(std::uint64_t serial) const {
@@ -135,8 +197,10 @@ bool NodeTree::Select(std::uint64_t serial) {
   const QSignalBlocker blocker(this);
   QTreeWidgetItem* item = ItemOf(serial);
   setCurrentItem(item);
-  if (item) scrollToItem(item);
-  return item != nullptr;
+  if (!item) return false;
+  Keep(*item);
+  scrollToItem(item);
+  return true;
 }
 
 void NodeTree::paintEvent(QPaintEvent* event) {
@@ -147,6 +211,12 @@ void NodeTree::paintEvent(QPaintEvent* event) {
   const int margin = Theme::Get().Scaled(16);
   painter.drawText(viewport()->rect().adjusted(margin, margin, -margin, -margin),
                    Qt::AlignTop | Qt::AlignHCenter | Qt::TextWordWrap, emptyText_);
+}
+
+bool NodeTree::focusNextPrevChild(bool next) {
+  if (!next) return QTreeWidget::focusNextPrevChild(next);
+  emit TabbedOn();
+  return true;
 }
 
 void NodeTree::contextMenuEvent(QContextMenuEvent* event) {

@@ -13,6 +13,8 @@ namespace {
 
 constexpr int kMostRecentFiles = 10;
 constexpr const char* kRecentFiles = "RecentFiles";
+constexpr const char* kBranches = "Branches";
+constexpr qsizetype kMostSetups = 30;  ///< Of which the branches are kept.
 constexpr const char* kDisplayUnits = "DisplayUnits";
 
 }  // namespace
@@ -44,5 +46,20 @@ void Program::AddRecentFile(const QString& path) {
 }
 
 void Program::ForgetRecentFiles() { settings_->remove(kRecentFiles); }
+
+QStringList Program::Branches(const QString& path) const {
+  for (const QVariant& kept : settings_->value(kBranches).toList()) {
+    const QStringList entry = kept.toStringList();
+    if (!entry.isEmpty() && entry.front() == path) return entry.mid(1);
+  }
+  return {};
+}
+
+void Program::KeepBranches(const QString& path, const QStringList& branches) {
+  QVariantList entries = settings_->value(kBranches).toList();
+  entries.removeIf([&](const QVariant& kept) { return kept.toStringList().value(0) == path; });
+  if (!branches.isEmpty()) entries.prepend(QStringList{path} + branches);
+  settings_->setValue(kBranches, entries.mid(0, kMostSetups));
+}
 
 }  // namespace tervane

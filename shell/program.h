@@ -27,6 +27,10 @@ class Program {
   void AddRecentFile(const QString& path);
   void ForgetRecentFiles();
 
+  /// Branches of the trees of a setup that was open lately, as they were left.
+  QStringList Branches(const QString& path) const;
+  void KeepBranches(const QString& path, const QStringList& branches);
+
   /// A folder of the user's for autosaves that cannot stand beside their setup.
   const std::string& RecoveryFolder() const { return recoveryFolder_; }
 

@@ -2,11 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/qt_host.h"
 
+#include <QAbstractButton>
 #include <QDesktopServices>
 #include <QEventLoop>
 #include <QFileDialog>
 #include <QMessageBox>
 #include <QProgressDialog>
+#include <QPushButton>
 #include <QTimer>
 #include <QUrl>
 #include <cstdio>
@@ -81,6 +83,21 @@ Host::Answer QtHost::Ask(const std::string& text, Icon icon, Buttons buttons) {
     default:
       return Answer::Cancel;
   }
+}
+
+std::optional<int> QtHost::Choose(const QString& text, const QString& explanation, const QStringList& answers) {
+  if (isUnattended_) {
+    std::fprintf(stderr, "quarzel: %s\n", FromQt(text).c_str());
+    return std::nullopt;
+  }
+  QMessageBox box(QMessageBox::Warning, QString(), text, QMessageBox::Cancel, window_);
+  box.setInformativeText(explanation);
+  QList<QAbstractButton*> buttons;
+  for (const QString& answer : answers) buttons.append(box.addButton(answer, QMessageBox::ActionRole));
+  box.setDefaultButton(QMessageBox::Cancel);
+  box.exec();
+  const auto pressed = buttons.indexOf(box.clickedButton());
+  return pressed >= 0 ? std::optional(static_cast<int>(pressed)) : std::nullopt;
 }
 
 std::optional<std::string> QtHost::AskFileToOpen(const FileQuestion& question) {

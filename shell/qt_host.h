@@ -19,6 +19,9 @@ class QtHost : public Host {
   /// declined.
   void SetUnattended() { isUnattended_ = true; }
 
+  /// Asks with buttons of these texts: the number of the pressed one, or nothing for Cancel, which is the default.
+  std::optional<int> Choose(const QString& text, const QString& explanation, const QStringList& answers);
+
   Answer Ask(const std::string& text, Icon icon, Buttons buttons) override;
   std::optional<std::string> AskFileToOpen(const FileQuestion& question) override;
   std::optional<std::string> AskFileToSave(const FileQuestion& question) override;

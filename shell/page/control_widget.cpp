@@ -8,6 +8,7 @@
 #include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QMenu>
+#include <QPainter>
 #include <QToolButton>
 #include <algorithm>
 
@@ -20,7 +21,26 @@ namespace tervane {
 namespace {
 
 constexpr int kWidestLabel = 300;  ///< In pixels at zoom 1; a longer label breaks into lines.
-constexpr int kMarkSize = 16;
+constexpr int kMarkSize = 16, kDotSize = 6;
+
+/// Stands behind a value that is not its default.
+class ChangedDot : public QWidget {
+ public:
+  ChangedDot() {
+    const int size = Theme::Get().Scaled(kDotSize);
+    setFixedSize(size, size);
+    setToolTip(ControlWidget::tr("This value differs from its default"));
+  }
+
+ protected:
+  void paintEvent(QPaintEvent* /*event*/) override {
+    QPainter painter(this);
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(Qt::NoPen);
+    painter.setBrush(Theme::Get().NoteColor());
+    painter.drawEllipse(rect());
+  }
+};
 
 }  // namespace
 
@@ -57,13 +77,24 @@ void ControlWidget::MakeLabel() {
   if (control_.label.empty()) return;
   auto* label = NewLabel(WithoutMarks(Translated(control_.label)), kWidestLabel);
   label_ = label;
+}
+
+void ControlWidget::AddTo(QMenu& menu) {
   if (!control_.node || control_.key.empty()) return;
   const QString path = ToQt(PathOf(*control_.node) + ":" + control_.key);
-  label->setToolTip(path);
-  auto* copy = new QAction(tr("&Copy Path of This Key"), label);
-  connect(copy, &QAction::triggered, this, [path] { QApplication::clipboard()->setText(path); });
-  label->addAction(copy);
-  label->setContextMenuPolicy(Qt::ActionsContextMenu);
+  QAction* reset = menu.addAction(tr("&Reset to Default"), this, [this] {
+    Forget();
+    if (reset_) Enter(ToQt(*reset_));
+  });
+  reset->setEnabled(reset_ && control_.IsEnabled());
+  menu.addAction(tr("Copy &Path of This Key"), this, [path] { QApplication::clipboard()->setText(path); });
+}
+
+void ControlWidget::ShowDeclared(const QString& toolTip, std::optional<std::string> reset) {
+  reset_ = std::move(reset);
+  if (label_) label_->setToolTip(toolTip);
+  if (editor_ && !HasOwnToolTip()) editor_->setToolTip(toolTip);
+  if (dot_) dot_->setVisible(reset_.has_value());
 }
 
 QBoxLayout* ControlWidget::MakeField(QWidget* editor, bool grows) {
@@ -74,7 +105,16 @@ QBoxLayout* ControlWidget::MakeField(QWidget* editor, bool grows) {
   auto* row = new QHBoxLayout;
   row->setSpacing(Theme::Get().Scaled(6));
   row->addWidget(editor, grows ? 1 : 0);
+  editor_ = editor;
   if (control_.itemType || !control_.unit.empty()) row->addWidget(unit_ = MakeUnit());
+  if (control_.isOfKey) {
+    row->addWidget(dot_ = new ChangedDot);
+    // What comes and goes must not move what stands beside it.
+    QSizePolicy policy = dot_->sizePolicy();
+    policy.setRetainSizeWhenHidden(true);
+    dot_->setSizePolicy(policy);
+    dot_->hide();
+  }
   const int size = Theme::Get().Scaled(kMarkSize);
   mark_ = new QLabel;
   mark_->setFixedSize(size, size);
@@ -126,9 +166,19 @@ void ControlWidget::SyncSubject() {
   if (!control_.subject || control_.subject() == subject_) return;
   subject_ = control_.subject();
   Forget();
+  ForgetRefusal();
+}
+
+void ControlWidget::ForgetRefusal() {
   refusal_.clear();
   SyncMessage();
   ShowRefused(false);
+}
+
+void ControlWidget::DropRefused() {
+  if (!IsRefused()) return;
+  ForgetRefusal();
+  SyncValue();
 }
 
 void ControlWidget::Sync() {

@@ -11,11 +11,14 @@
 #include <QWidget>
 #include <functional>
 #include <memory>
+#include <optional>
+#include <string>
 #include <vector>
 
 #include "forms/page.h"
 
 class QBoxLayout;
+class QMenu;
 
 namespace tervane {
 
@@ -43,6 +46,12 @@ class ControlWidget : public QObject {
   virtual void Commit() {}
   /// The widget that takes the keyboard; null where there is none.
   virtual QWidget* FocusTarget() const { return nullptr; }
+  /// Takes what the declaration tells of the key; `reset` is what gives it its default, nothing where it has it.
+  void ShowDeclared(const QString& toolTip, std::optional<std::string> reset);
+  /// Adds the commands on the value to a menu.
+  void AddTo(QMenu& menu);
+  /// A value that the page has not taken gives way to the node's.
+  void DropRefused();
   /// The value is none that the page takes, so that the node has another one.
   bool IsRefused() const { return !refusal_.isEmpty(); }
 
@@ -63,6 +72,8 @@ class ControlWidget : public QObject {
   virtual void ShowRefused(bool /*refused*/) {}
   /// What was typed and not entered belongs to what was shown before.
   virtual void Forget() {}
+  /// A field that tells its own value there keeps its tool tip.
+  virtual bool HasOwnToolTip() const { return false; }
 
   CYbSEDlgBase& Page() const { return page_; }
   /// Puts the label in front of the field.
@@ -73,6 +84,7 @@ class ControlWidget : public QObject {
  private:
   QWidget* MakeUnit();
   void SyncSubject();
+  void ForgetRefusal();
   void SyncUnit();
   void SyncFindings();
   void SyncMessage();
@@ -82,6 +94,9 @@ class ControlWidget : public QObject {
   QPointer<QWidget> label_, field_;
   QPointer<QWidget> unit_;  ///< A label, or a button where the user may choose.
   QPointer<QLabel> mark_, message_;
+  QPointer<QWidget> editor_;
+  QPointer<QWidget> dot_;  ///< Marks a value that is not the default.
+  std::optional<std::string> reset_;
   QString refusal_, remark_;
   std::uintptr_t subject_ = 0;  ///< What the value that is shown belongs to.
 };

@@ -1,6 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <QAction>
+#include <QContextMenuEvent>
 #include <QDropEvent>
 #include <QHBoxLayout>
 #include <QKeyEvent>
@@ -63,6 +64,7 @@ class LineWidget : public ControlWidget {
 
  protected:
   void Forget() override { edited_ = false; }
+  bool HasOwnToolTip() const override { return Described().kind == ControlKind::File || edit_->isReadOnly(); }
   void SyncValue() override {
     if (edited_ || IsRefused()) return;
     if (const QString text = ToQt(Described().Text()); text != edit_->text()) {
@@ -92,6 +94,13 @@ class LineWidget : public ControlWidget {
         Enter(urls.front().toLocalFile());
         return true;
       }
+    }
+    if (event->type() == QEvent::ContextMenu) {
+      const std::unique_ptr<QMenu> menu(edit_->createStandardContextMenu());
+      menu->addSeparator();
+      AddTo(*menu);
+      menu->exec(static_cast<QContextMenuEvent*>(event)->globalPos());
+      return true;
     }
     if (event->type() == QEvent::KeyPress) {
       const int key = static_cast<QKeyEvent*>(event)->key();

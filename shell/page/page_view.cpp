@@ -12,9 +12,12 @@
 #include <QStyle>
 #include <QVBoxLayout>
 #include <algorithm>
+#include <functional>
 
+#include "pages/tree_entries.h"
 #include "shell/page/control_widget.h"
 #include "shell/page/group_row.h"
+#include "shell/widgets/flash_mark.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -28,6 +31,9 @@ constexpr int kFormBesidePlot = 530;
 constexpr int kMostFindings = 4;  ///< Lines below a form; the tab of findings has them all.
 
 enum Column { kLabelColumn, kFieldColumn };
+
+/// Of a control that has neither key nor label, as tables.
+std::string NumberedName(std::size_t number) { return "#" + std::to_string(number); }
 
 QString SeverityText(Severity severity) {
   return severity == Severity::Error     ? PageView::tr("Error")
@@ -50,14 +56,14 @@ struct PageView::SubForms {
   QWidget* place;
 };
 
-PageView::PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path)
+PageView::PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& place, const QString& path)
     : ownPage_(std::move(page)), page_(*ownPage_) {
-  Build(path);
+  Build(place, path);
 }
 
-PageView::PageView(CYbSEDlgBase& form) : page_(form) { Build({}); }
+PageView::PageView(CYbSEDlgBase& form) : page_(form) { Build({}, {}); }
 
-void PageView::Build(const QString& path) {
+void PageView::Build(const QString& placeText, const QString& path) {
   const Theme& theme = Theme::Get();
   const int margin = theme.Scaled(16);
   auto* all = new QVBoxLayout(this);
@@ -75,12 +81,13 @@ void PageView::Build(const QString& path) {
   title->setFont(bold);
   title->setWordWrap(true);
   head->addWidget(title);
-  auto* place = new QLabel(path);
+  auto* place = new QLabel(placeText);
+  place->setTextFormat(Qt::PlainText);
   QPalette quiet = place->palette();
   quiet.setColor(QPalette::WindowText, theme.QuietColor());
   place->setPalette(quiet);
   place->setTextInteractionFlags(Qt::TextSelectableByMouse);
-  place->setToolTip(tr("The node's path, as messages and the command line write it"));
+  if (!path.isEmpty()) place->setToolTip(tr("On the command line: %1").arg(path));
   head->addWidget(place);
   all->addWidget(top);
   top->setVisible(ownPage_ != nullptr);
@@ -99,6 +106,8 @@ void PageView::Build(const QString& path) {
 
   scroll_ = new QScrollArea;
   scroll_->setFrameShape(QFrame::NoFrame);
+  // The keyboard goes from field to field; the area around them would be a stop that nobody sees.
+  scroll_->setFocusPolicy(Qt::NoFocus);
   scroll_->setWidgetResizable(true);
   scroll_->setWidget(content);
   if (plots_.empty()) {
@@ -312,7 +321,12 @@ void PageView::Sync() {
     const auto& inside = control->group->Controls();
     box->setEnabled(std::ranges::any_of(inside, [](const auto& each) { return each->IsEnabled(); }));
   }
-  for (const auto& widget : widgets_) widget->Sync();
+  defaults_.Look();
+  for (const auto& widget : widgets_) {
+    widget->Sync();
+    const Control& control = widget->Described();
+    widget->ShowDeclared(Translated(defaults_.ToolTip(control)), defaults_.Reset(control));
+  }
   if (plotPlace_)
     plotPlace_->setVisible(std::ranges::any_of(plots_, [](const Control* control) { return control->IsShown(); }));
   if (split_ && isVisible()) PlacePlots();
@@ -333,7 +347,14 @@ void PageView::SyncFindings() {
     lines += QString("<div><b style='color:%1'>%2</b>&nbsp; %3</div>")
                  .arg(color.name(), SeverityText(finding.severity), text);
   };
-  for (const Finding& finding : page_.Node().Findings()) add(finding);
+  const std::function<void(const CYbSEKvfBase&)> addAll = [&](const CYbSEKvfBase& node) {
+    for (const Finding& finding : node.Findings()) add(finding);
+    // What has no page of its own, such as a file, speaks here.
+    for (const CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+      if (!PageClassOf(*child)) addAll(*child);
+  };
+  // A dialog asks for something of its own.
+  if (ownPage_) addAll(page_.Node());
   if (count > kMostFindings) lines += "<div>" + tr("and %n more", nullptr, count - kMostFindings) + "</div>";
   findings_->setText(lines);
   findings_->setVisible(count > 0);
@@ -343,31 +364,71 @@ void PageView::Commit() {
   for (const auto& widget : widgets_) widget->Commit();
 }
 
+ControlWidget* PageView::Find(const std::string& name) const {
+  if (name.empty()) return nullptr;
+  ControlWidget* hidden = nullptr;
+  for (std::size_t i = 0; i < widgets_.size(); ++i) {
+    const Control& control = widgets_[i]->Described();
+    if (control.key != name && control.label != name && name != NumberedName(i)) continue;
+    // Sub-forms may bear the same key, of which one is shown.
+    if (widgets_[i]->Field()->isVisibleTo(this)) return widgets_[i].get();
+    if (!hidden) hidden = widgets_[i].get();
+  }
+  return hidden;
+}
+
 void PageView::FocusOn(const std::string& key) {
-  const auto takesKeyboard = [](const auto& widget) {
-    return widget->FocusTarget() && widget->Described().IsShown() && widget->Described().IsEnabled();
-  };
-  auto found = std::ranges::find_if(widgets_, [&](const auto& widget) {
-    const Control& control = widget->Described();
-    return !key.empty() && (control.key == key || control.label == key) && widget->FocusTarget();
-  });
-  if (found == widgets_.end()) found = std::ranges::find_if(widgets_, takesKeyboard);
-  if (found == widgets_.end()) return;
-  (*found)->FocusTarget()->setFocus(Qt::ShortcutFocusReason);
-  scroll_->ensureWidgetVisible((*found)->Field());
+  ControlWidget* found = Find(key);
+  if (!found) {
+    const auto first = std::ranges::find_if(widgets_, [](const auto& widget) {
+      return widget->FocusTarget() && widget->Described().IsShown() && widget->Described().IsEnabled();
+    });
+    if (first == widgets_.end()) return;
+    found = first->get();
+  }
+  scroll_->ensureWidgetVisible(found->Field());
+  // What cannot be changed now is shown, and no neighbour in its place.
+  if (!found->FocusTarget() || !found->FocusTarget()->isEnabled()) return PointOut(found);
+  found->FocusTarget()->setFocus(Qt::ShortcutFocusReason);
+}
+
+std::string PageView::NameOf(const void* control) const {
+  for (std::size_t i = 0; control && i < widgets_.size(); ++i) {
+    const Control& described = widgets_[i]->Described();
+    if (&described == control)
+      return !described.key.empty() ? described.key : !described.label.empty() ? described.label : NumberedName(i);
+  }
+  return {};
+}
+
+void PageView::PointOut(const std::string& name) {
+  ControlWidget* found = Find(name);
+  if (!found) return;
+  FocusOn(name);
+  PointOut(found);
+}
+
+void PageView::PointOut(ControlWidget* widget) {
+  if (widget->Field()) new FlashMark(widget->Field());
+}
+
+void PageView::DropRefused() {
+  for (const auto& widget : widgets_) widget->DropRefused();
 }
 
 void PageView::contextMenuEvent(QContextMenuEvent* event) {
-  // What is disabled hands its events on to the page.
+  // What is disabled hands its events on to the page, and so do labels and check boxes.
   for (const auto& widget : widgets_) {
     const Control& control = widget->Described();
-    if (control.IsEnabled() || control.enabledWhen.IsAlways()) continue;
     const auto isHit = [&](const QWidget* part) {
       return part && part->isVisible() && part->rect().contains(part->mapFromGlobal(event->globalPos()));
     };
     if (!isHit(widget->Label()) && !isHit(widget->Field())) continue;
     QMenu menu;
-    menu.addAction(tr("&Why Is This Grey?"), this, [this, &control] { emit WhyAsked(&control); });
+    if (!control.IsEnabled() && !control.enabledWhen.IsAlways())
+      menu.addAction(tr("&Why Is This Grey?"), this, [this, &control] { emit WhyAsked(&control); });
+    widget->AddTo(menu);
+    if (menu.isEmpty()) continue;
     menu.exec(event->globalPos());
     return;
   }

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "forms/page.h"
+#include "pages/key_defaults.h"
 
 class QGridLayout;
 class QLabel;
@@ -24,8 +25,8 @@ class PageView : public QWidget {
   Q_OBJECT
 
  public:
-  /// `path` is shown below the title.
-  PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& path);
+  /// `place` is shown below the title, with the path as its tool tip.
+  PageView(std::unique_ptr<CYbSEDlgBase> page, const QString& place, const QString& path = {});
   /// The form alone, of a dialog that owns it.
   explicit PageView(CYbSEDlgBase& form);
   ~PageView() override;
@@ -39,6 +40,12 @@ class PageView : public QWidget {
   void Commit();
   /// Puts the keyboard on the control of a key, or with that label; the first control when there is none.
   void FocusOn(const std::string& key);
+  /// The name by which a control of this page is found again on a page that is made anew; empty for no control of it.
+  std::string NameOf(const void* control) const;
+  /// Puts the keyboard on the control of that name and lets it stand out for a moment.
+  void PointOut(const std::string& name);
+  /// Texts that were not taken give way to what the node holds.
+  void DropRefused();
 
  signals:
   void UnitChosen(int itemType, int unit);
@@ -62,12 +69,16 @@ class PageView : public QWidget {
   void PlacePlots();
   void AlignLabels();
   void SyncFindings();
+  /// The control of a key, a label or a name of `NameOf`; one that is shown if there is one. Null when there is none.
+  ControlWidget* Find(const std::string& name) const;
+  void PointOut(ControlWidget* widget);
 
-  void Build(const QString& path);
+  void Build(const QString& place, const QString& path);
 
   std::unique_ptr<CYbSEDlgBase> ownPage_;
   CYbSEDlgBase& page_;
   std::vector<std::unique_ptr<ControlWidget>> widgets_;
+  KeyDefaults defaults_;
   std::vector<std::unique_ptr<Form>> forms_;
   std::vector<std::unique_ptr<SubForms>> subForms_;
   /// Groups, whose frames follow the rules of their controls.

@@ -20,6 +20,8 @@ namespace tervane {
 
 namespace {
 
+constexpr qsizetype kLongValue = 40;  ///< Letters.
+
 /// A value that is only shown.
 class ShownWidget : public ControlWidget {
  public:
@@ -37,8 +39,8 @@ class ShownWidget : public ControlWidget {
     const QString value = Translated(Described().Text());
     const bool bearsLabel = Described().beside && !Described().label.empty();
     value_->setText(bearsLabel ? QString("%1: %2").arg(Translated(Described().label), value) : value);
-    // Several lines are a text to be read, however narrow the page is.
-    value_->setWordWrap(value.contains('\n'));
+    // Several lines, or a sentence, are a text to be read, however narrow the page is.
+    value_->setWordWrap(value.contains('\n') || value.size() > kLongValue);
   }
 
  private:

@@ -6,11 +6,22 @@
 #include <QFont>
 #include <QPalette>
 #include <QPointer>
+#include <QRegularExpression>
 
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
 namespace tervane {
+
+namespace {
+
+/// A number, perhaps with the share that it stands for behind: "812.5 (98%)".
+bool IsNumberText(const QString& text) {
+  static const QRegularExpression number(R"(^-?\d+(\.\d+)?(e[+-]?\d+)?( \([\d.]+%\))?$)");
+  return number.match(text).hasMatch();
+}
+
+}  // namespace
 
 QStringList TableModel::Columns() const {
   QStringList columns;
@@ -88,7 +99,8 @@ QVariant TableModel::data(const QModelIndex& index, int role) const {
       return {};
     case Qt::TextAlignmentRole: {
       const CellKind kind = Table().Kind(row, column);
-      const bool isNumber = kind == CellKind::Number || kind == CellKind::Integer;
+      const bool isNumber = kind == CellKind::Number || kind == CellKind::Integer ||
+                            (Table().IsShownOnly() && IsNumberText(ToQt(Table().ShownCell(row, column))));
       return static_cast<int>(Qt::AlignVCenter | (isNumber ? Qt::AlignRight : Qt::AlignLeft));
     }
     default:

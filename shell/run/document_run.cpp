@@ -2,11 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/run/document_run.h"
 
+#include <QDateTime>
 #include <QFileInfo>
 #include <QGuiApplication>
-#include <QTime>
 
 #include "execution/engine_search.h"
+#include "platform/files.h"
 #include "shell/run/run_panel.h"
 #include "shell/widgets/qt_text.h"
 
@@ -83,10 +84,28 @@ void DocumentRun::Follow(SetupRun run, bool wasFound) {
   stops_ = 0;
   isGoing_ = true;
   wasFound_ = wasFound;
+  ranOn_ = StateThatRuns();
   follower_ = std::make_unique<RunFollower>(std::move(run));
   tick_.start(kTick);
   emit MessagesCame();
   emit Begun();
+}
+
+std::optional<std::uint64_t> DocumentRun::StateThatRuns() const {
+  const UndoStack& steps = session_.Steps();
+  if (!wasFound_) return steps.StateNumber();
+  // Of a run that was started elsewhere the file's time alone is known.
+  const auto saved = std::chrono::file_clock::to_sys(StampOf(session_.Path()).time).time_since_epoch();
+  const bool isOlder = std::chrono::duration_cast<std::chrono::milliseconds>(saved).count() <= state_.begun;
+  return isOlder && steps.IsSaved() ? std::optional(steps.StateNumber()) : std::nullopt;
+}
+
+QString DocumentRun::WhyOutOfDate() const {
+  if (state_.begun == 0 || ranOn_ == session_.Steps().StateNumber()) return {};
+  const QDateTime begun = QDateTime::fromMSecsSinceEpoch(state_.begun);
+  const bool isToday = begun.date() == QDate::currentDate();
+  return tr("from the run of %1, the setup has changed since")
+      .arg(begun.toString(isToday ? "HH:mm" : "yyyy-MM-dd HH:mm"));
 }
 
 void DocumentRun::Tick() {

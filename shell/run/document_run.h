@@ -6,6 +6,7 @@
 #include <QPointer>
 #include <QString>
 #include <QTimer>
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <optional>
@@ -49,6 +50,9 @@ class DocumentRun : public QObject, public EngineShell {
   /// How the latest run ended; empty while it goes on.
   QString Sentence() const { return sentence_; }
   QString Name() const;
+  /// What the latest run told may hold no more, and why: "from the run of 06:47, the setup has changed since". Empty
+  /// while nothing has changed.
+  QString WhyOutOfDate() const;
 
   // ---- Commands
 
@@ -78,6 +82,7 @@ class DocumentRun : public QObject, public EngineShell {
 
  private:
   void Follow(SetupRun run, bool wasFound);
+  std::optional<std::uint64_t> StateThatRuns() const;
   void Tick();
   void End(RunOutcome outcome);
 
@@ -94,6 +99,7 @@ class DocumentRun : public QObject, public EngineShell {
   QPointer<RunWindow> progressWindow_;
   QTimer tick_;
   bool isGoing_ = false, wasFound_ = false;
+  std::optional<std::uint64_t> ranOn_;  ///< The state of the setup that it runs; nothing where that is another one.
   int stops_ = 0;
 };
 

@@ -25,7 +25,7 @@ RunPanel::RunPanel(DocumentRun& run) : run_(run) {
   text_->setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Preferred);
   text_->setTextFormat(Qt::PlainText);
   time_ = new QLabel;
-  stop_ = new QPushButton(tr("&Stop"));
+  stop_ = new QPushButton(tr("Sto&p"));
   // No key that is meant for something else stops an engine.
   stop_->setAutoDefault(false);
   row->addWidget(bar_);

@@ -11,17 +11,34 @@
 
 namespace tervane {
 
-Banner::Banner(const QString& text, const std::vector<Answer>& answers) {
+namespace {
+
+QColor BackgroundOf(Banner::Tone tone, bool isDark) {
+  switch (tone) {
+    case Banner::Tone::Question:
+      return isDark ? QColor(0x4a, 0x3d, 0x17) : QColor(0xff, 0xf4, 0xcf);
+    case Banner::Tone::Good:
+      return isDark ? QColor(0x1f, 0x43, 0x2c) : QColor(0xdc, 0xf3, 0xe2);
+    case Banner::Tone::Bad:
+      return isDark ? QColor(0x54, 0x27, 0x24) : QColor(0xfd, 0xe3, 0xe0);
+  }
+  return {};
+}
+
+}  // namespace
+
+Banner::Banner(const QString& text, const std::vector<Answer>& answers, Tone tone) : text_(text) {
   const Theme& theme = Theme::Get();
   setAutoFillBackground(true);
   QPalette palette = this->palette();
-  palette.setColor(QPalette::Window, theme.IsDark() ? QColor(0x4a, 0x3d, 0x17) : QColor(0xff, 0xf4, 0xcf));
+  palette.setColor(QPalette::Window, BackgroundOf(tone, theme.IsDark()));
   setPalette(palette);
   auto* row = new QHBoxLayout(this);
   row->setContentsMargins(theme.Scaled(12), theme.Scaled(6), theme.Scaled(8), theme.Scaled(6));
-  auto* label = new QLabel(text);
-  label->setWordWrap(true);
-  row->addWidget(label, 1);
+  label_ = new QLabel(text);
+  label_->setTextFormat(Qt::PlainText);
+  label_->setWordWrap(true);
+  row->addWidget(label_, 1);
   for (const Answer& answer : answers) {
     auto* button = new QPushButton(answer.first);
     row->addWidget(button);
@@ -40,6 +57,15 @@ Banner::Banner(const QString& text, const std::vector<Answer>& answers) {
     hide();
     deleteLater();
   });
+}
+
+void Banner::Age(const QString& reason) {
+  label_->setText(reason.isEmpty() ? text_ : text_ + " " + reason);
+  QPalette palette = QFrame().palette();
+  if (reason.isEmpty()) palette.setColor(QPalette::Window, this->palette().color(QPalette::Window));
+  palette.setColor(QPalette::WindowText,
+                   reason.isEmpty() ? palette.color(QPalette::WindowText) : Theme::Get().QuietColor());
+  label_->setPalette(palette);
 }
 
 }  // namespace tervane

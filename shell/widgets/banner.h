@@ -8,6 +8,8 @@
 #include <utility>
 #include <vector>
 
+class QLabel;
+
 namespace tervane {
 
 /// A question or a message that waits below a document without standing in the way of the work.
@@ -16,8 +18,17 @@ class Banner : public QFrame {
 
  public:
   using Answer = std::pair<QString, std::function<void()>>;
+  /// A matter to be decided, or how something ended.
+  enum class Tone { Question, Good, Bad };
   /// Any answer closes the banner, and so does its cross.
-  Banner(const QString& text, const std::vector<Answer>& answers);
+  Banner(const QString& text, const std::vector<Answer>& answers, Tone tone = Tone::Question);
+
+  /// What it tells is of the past, for the reason that is put behind it: it stands back.
+  void Age(const QString& reason);
+
+ private:
+  QString text_;
+  QLabel* label_;
 };
 
 }  // namespace tervane

@@ -2,21 +2,26 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <QAbstractItemView>
 #include <QStyledItemDelegate>
-
-#include "shell/widgets/theme.h"
 
 namespace tervane {
 
-/// Rows of trees and lists with some air between them.
+/// Rows of trees and lists with some air between them. The selected row of the view that is its parent stands back
+/// while the view has not the keyboard.
 class RowDelegate : public QStyledItemDelegate {
  public:
-  using QStyledItemDelegate::QStyledItemDelegate;
+  explicit RowDelegate(QAbstractItemView* view);
 
-  QSize sizeHint(const QStyleOptionViewItem& option, const QModelIndex& index) const override {
-    const QSize size = QStyledItemDelegate::sizeHint(option, index);
-    return {size.width(), size.height() + Theme::Get().Scaled(6)};
-  }
+  QSize sizeHint(const QStyleOptionViewItem& option, const QModelIndex& index) const override;
+
+ protected:
+  bool eventFilter(QObject* watched, QEvent* event) override;
+
+ private:
+  void FollowFocus(bool hasFocus);
+
+  QAbstractItemView* view_;
 };
 
 }  // namespace tervane

@@ -73,6 +73,12 @@ class ZoomedStyle : public QProxyStyle {
       case PM_TreeViewIndentation:
       case PM_SmallIconSize:
       case PM_ListViewIconSize:
+      case PM_ButtonIconSize:
+      case PM_TabCloseIndicatorWidth:
+      case PM_TabCloseIndicatorHeight:
+      case PM_TabBarScrollButtonWidth:
+      case PM_ScrollBarExtent:
+      case PM_MenuButtonIndicator:
         return theTheme ? theTheme->Scaled(size) : size;
       default:
         return size;

@@ -5,8 +5,10 @@
 #include <QCheckBox>
 #include <QDialog>
 #include <QPlainTextEdit>
+#include <QScrollArea>
 #include <QTextBrowser>
 #include <QTreeWidget>
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 
@@ -18,6 +20,8 @@
 #include "shell/maps/map_canvas.h"
 #include "shell/node_tree.h"
 #include "shell/run/document_run.h"
+#include "shell/widgets/flash_mark.h"
+#include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
 #include "tests/support/preprocessed_run.h"
 
@@ -99,6 +103,90 @@ TEST(DocumentFrame, UndoTakesBackWhatAnyPageChangedAndTheTitleTells) {
   EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "");
   EXPECT_EQ(setup.Frame().Title(), "karup.tvd");
   EXPECT_EQ(setup.Focused<QLineEdit>()->text(), "");
+}
+
+NodeTree* ShownTree(OpenedSetup& setup) {
+  for (auto* tree : setup.Frame().findChildren<NodeTree*>())
+    if (tree->isVisible()) return tree;
+  return nullptr;
+}
+
+TEST(DocumentFrame, UndoGoesToWhatItChangesAndDropsTextsThatWereNotTaken) {
+  OpenedSetup setup;
+  QStringList told;
+  QObject::connect(&setup.Frame(), &DocumentFrame::Told, [&](const QString& text) { told << text; });
+  const char* increment = "SimSpec/CompControlParaTimeStep:IncrementRate";
+  setup.GoTo("SimSpec/CompControlParaTimeStep:IncrementRate");
+  const QString before = setup.Focused<QLineEdit>()->text();
+  setup.Type("0.07");
+  setup.Press(Qt::Key_Return);
+  ASSERT_EQ(setup.Value(increment), "0.07");
+  setup.GoTo("SimSpec/SimulationPeriod:SIMSTART");
+  auto* start = setup.Focused<QLineEdit>();
+  const QString date = start->text();
+  setup.Type("no date");
+  setup.Press(Qt::Key_Return);
+  EXPECT_TRUE(setup.Shows("Not taken"));
+  const std::string step = setup.Session().Steps().UndoName();
+  setup.Command(ToQt("Undo " + step));
+  EXPECT_EQ(setup.Frame().CurrentPath(), "SimSpec/CompControlParaTimeStep");
+  EXPECT_EQ(setup.Focused<QLineEdit>()->text(), before);
+  EXPECT_THAT(setup.Focused<QLineEdit>()->parentWidget()->findChildren<FlashMark*>(), testing::SizeIs(1));
+  EXPECT_THAT(told, testing::ElementsAre(ToQt("Undone: " + step)));
+  setup.GoTo("SimSpec/SimulationPeriod:SIMSTART");
+  EXPECT_EQ(setup.Focused<QLineEdit>()->text(), date);
+  EXPECT_FALSE(setup.Shows("Not taken"));
+  setup.Frame().Redo();
+  EXPECT_EQ(setup.Frame().CurrentPath(), "SimSpec/CompControlParaTimeStep");
+  EXPECT_EQ(setup.Focused<QLineEdit>()->text(), "0.07");
+}
+
+TEST(DocumentFrame, ALongBranchBeginsClosedWithItsNumberAndStaysAsItWasLeft) {
+  OpenedSetup setup(test::Example{"rhone", "rhone.tvd"});
+  const auto branch = [&] {
+    const auto found = ShownTree(setup)->findItems("Precipitation Rate (50)", Qt::MatchExactly | Qt::MatchRecursive);
+    EXPECT_EQ(found.size(), 1);
+    return found.value(0);
+  };
+  ASSERT_TRUE(branch());
+  EXPECT_FALSE(branch()->isExpanded());
+  EXPECT_TRUE(branch()->icon(0).isNull());
+  // What it hides is marked on it, and a finding inside opens it.
+  setup.GoTo("Climate/PrecipitationRate/TIME_SERIES_7:FILE_NAME");
+  EXPECT_TRUE(branch()->isExpanded());
+  setup.Type("missing.nds0");
+  setup.Press(Qt::Key_Return);
+  EXPECT_TRUE(branch()->icon(0).isNull());
+  branch()->setExpanded(false);
+  EXPECT_FALSE(branch()->icon(0).isNull());
+  branch()->setExpanded(true);
+  setup.Command("Zoom In");
+  EXPECT_TRUE(branch()->isExpanded());
+  setup.Command("Actual Size");
+  const test::NextAnswer discard("Discard");
+  ASSERT_TRUE(setup.Window().CloseDocument(&setup.Frame()));
+  ASSERT_TRUE(setup.Window().OpenDocument(ToQt(setup.Path())));
+  EXPECT_TRUE(branch()->isExpanded());
+}
+
+TEST(DocumentFrame, TabGoesFromTheTreeToThePageAndFromFieldToField) {
+  OpenedSetup setup;
+  setup.GoTo("SimSpec/SimulationPeriod");
+  auto* tree = ShownTree(setup);
+  tree->setFocus();
+  const QColor strong = tree->palette().color(QPalette::Highlight);
+  std::vector<const QWidget*> stops;
+  for (int i = 0; i < 6; ++i) {
+    setup.Press(Qt::Key_Tab);
+    const QWidget* stop = setup.Window().focusWidget();
+    EXPECT_FALSE(qobject_cast<const QScrollArea*>(stop));
+    EXPECT_TRUE(stop->isVisible() && stop->visibleRegion().boundingRect().isValid());
+    stops.push_back(stop);
+  }
+  const auto pages = setup.Frame().findChildren<PageView*>();
+  EXPECT_TRUE(std::ranges::any_of(pages, [&](auto* page) { return page->isAncestorOf(stops.front()); }));
+  // Where the keyboard is can be seen.
+  EXPECT_NE(tree->palette().color(QPalette::Highlight), strong);
 }
 
 // ---- Processed data

@@ -147,7 +147,7 @@ TEST_F(LibraryInWindow, FollowsTheDiskUnlessThereAreChanges) {
   Tab().CheckDisk();
   EXPECT_EQ(Name(2), "Meadow 2");
   {
-    const NextAnswer no("No");
+    const NextAnswer no("Cancel");
     EXPECT_FALSE(setup_.Window().SaveLibrary());
     EXPECT_THAT(no.Text(), HasSubstr("Another program has changed crops.etv"));
   }

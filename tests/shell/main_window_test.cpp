@@ -3,11 +3,17 @@
 #include "shell/main_window.h"
 
 #include <QDir>
+#include <QHash>
+#include <QMenu>
+#include <QMenuBar>
 #include <QPushButton>
 #include <QTabWidget>
+#include <QTreeWidget>
 
 #include <gmock/gmock.h>
 
+#include "shell/changes_dialog.h"
+#include "shell/widgets/banner.h"
 #include "shell/widgets/theme.h"
 #include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
@@ -21,7 +27,7 @@ using testing::HasSubstr;
 
 QPushButton* ReloadButton(OpenedSetup& setup) {
   for (QPushButton* button : setup.Frame().findChildren<QPushButton*>())
-    if (button->text() == "&Reload") return button;
+    if (QString(button->text()).remove('&') == "Reload") return button;
   return nullptr;
 }
 
@@ -42,11 +48,102 @@ TEST(MainWindow, RunCommandsFollowTheComponents) {
   EXPECT_TRUE(withQuality.Action("Water quality")->isChecked());
 }
 
-TEST(MainWindow, RefreshMarksTheDocumentModified) {
+TEST(MainWindow, RefreshMarksTheDocumentModifiedAndClosingAsksForNothing) {
   OpenedSetup setup;
   setup.Command("Refresh");
   EXPECT_TRUE(setup.Session().IsModified());
   EXPECT_FALSE(setup.Session().Steps().CanUndo());
+  const NextAnswer asked("Cancel");
+  EXPECT_TRUE(setup.Window().CloseDocument(&setup.Frame()));
+  EXPECT_EQ(asked.Text(), "");
+}
+
+/// The letters that the texts of a menu mark, each with the text.
+void CheckLetters(const QMenu& menu) {
+  QHash<QChar, QString> letters;
+  for (const QAction* action : menu.actions()) {
+    if (action->isSeparator()) continue;
+    const QString text = action->text();
+    const auto mark = text.indexOf('&');
+    EXPECT_GE(mark, 0) << "no letter: " << FromQt(text);
+    if (mark < 0) continue;
+    const QChar letter = text[mark + 1].toLower();
+    EXPECT_FALSE(letters.contains(letter)) << FromQt(text) << " and " << FromQt(letters.value(letter));
+    letters.insert(letter, text);
+    if (action->menu() && action->menu()->title() != "Open &Recent") CheckLetters(*action->menu());
+  }
+}
+
+TEST(MainWindow, EveryLetterMeansOneThing) {
+  OpenedSetup setup;
+  QMenu bar;
+  for (QAction* action : setup.Window().menuBar()->actions()) bar.addAction(action);
+  CheckLetters(bar);
+  // What waits at the foot is chosen by letters too, which are none of the menus'.
+  setup.Folder().Write("karup.tvd", test::SetupText(14, "section SimSpec {\nsection SimTitle {\nTitle = \"x\"\n}\n}"));
+  setup.Frame().CheckDisk();
+  int buttons = 0;
+  for (const Banner* banner : setup.Frame().findChildren<Banner*>())
+    for (const QPushButton* button : banner->findChildren<QPushButton*>()) {
+      ++buttons;
+      bar.addAction(button->text());
+    }
+  EXPECT_GE(buttons, 3);
+  CheckLetters(bar);
+}
+
+TEST(MainWindow, AFileThatAnotherProgramChangedIsNotSavedOverWithoutALook) {
+  const auto change = [](OpenedSetup& setup) {
+    setup.GoTo("SimSpec/SimTitle:Title");
+    setup.Type("mine");
+    setup.Folder().Write("karup.tvd",
+                         test::SetupText(14, "section SimSpec {\nsection SimTitle {\nTitle = \"theirs\"\n}\n}"));
+  };
+  {
+    OpenedSetup setup;
+    change(setup);
+    // The key that confirms without a look cancels.
+    QTimer::singleShot(50, [] { QTest::keyClick(QApplication::activeModalWidget(), Qt::Key_Return); });
+    EXPECT_FALSE(setup.Window().SaveDocument());
+    EXPECT_THAT(test::ReadFile(setup.Path()), HasSubstr("theirs"));
+    const NextAnswer saveAs("Discard");
+    setup.Window().CloseDocument(&setup.Frame());
+  }
+  {
+    OpenedSetup setup;
+    change(setup);
+    {
+      const NextAnswer reload("Reload");
+      EXPECT_FALSE(setup.Window().SaveDocument());
+      EXPECT_THAT(reload.Text(), HasSubstr("Another program has changed karup.tvd"));
+    }
+    const NextAnswer throwAway("Yes");
+    QApplication::processEvents();
+    EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "theirs");
+  }
+  {
+    OpenedSetup setup;
+    change(setup);
+    const NextAnswer differences("Differences…");
+    std::string shown;
+    QTimer look;
+    QObject::connect(&look, &QTimer::timeout, [&] {
+      auto* dialog = qobject_cast<ChangesDialog*>(QApplication::activeModalWidget());
+      if (!dialog) return;
+      look.stop();
+      for (const QTreeWidgetItem* row :
+           dialog->findChild<QTreeWidget*>()->findItems("Title", Qt::MatchExactly | Qt::MatchRecursive))
+        shown = FromQt(row->text(2) + " -> " + row->text(3));
+      for (QPushButton* button : dialog->findChildren<QPushButton*>())
+        if (button->text() == "&Save Over It") return button->click();
+      ADD_FAILURE() << "no button to save over it";
+      dialog->reject();
+    });
+    look.start(5);
+    EXPECT_TRUE(setup.Window().SaveDocument());
+    EXPECT_EQ(shown, "\"theirs\" -> \"mine\"");
+    EXPECT_THAT(test::ReadFile(setup.Path()), HasSubstr("mine"));
+  }
 }
 
 TEST(MainWindow, WithoutAUserAMessageIsPrintedAndNothingWaits) {

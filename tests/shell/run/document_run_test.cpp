@@ -19,6 +19,7 @@
 #include "shell/maps/map_canvas.h"
 #include "shell/run/log_view.h"
 #include "shell/run/run_panel.h"
+#include "shell/widgets/banner.h"
 #include "shell/widgets/plot_frame.h"
 #include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
@@ -78,7 +79,7 @@ TEST(DocumentRun, SavesRunsAndLeadsFromAMessageToTheControl) {
   EXPECT_TRUE(setup.ShowsProgress());
   EXPECT_FALSE(setup.Action("Execute...")->isEnabled());
   EXPECT_TRUE(setup.Action("Run preprocessor only")->isEnabled());
-  auto* bar = setup.Frame().findChild<QProgressBar*>();
+  auto* bar = setup.Frame().findChild<RunPanel*>()->findChild<QProgressBar*>();
   EXPECT_TRUE(QTest::qWaitFor([&] { return bar->isVisible() && bar->value() == 42; }));
   EXPECT_TRUE(setup.Shows("half"));
   setup.Folder().Write("go", "");
@@ -91,12 +92,38 @@ TEST(DocumentRun, SavesRunsAndLeadsFromAMessageToTheControl) {
 
   auto* findings = setup.Frame().findChild<FindingsView*>();
   EXPECT_FALSE(findings->findItems("Nowhere:Key: hm — told by the engine", Qt::MatchExactly, 2).empty());
-  const auto odd = findings->findItems("SimSpec/SimTitle:Title", Qt::MatchExactly, 1);
+  const auto odd = findings->findItems("is odd — told by the engine", Qt::MatchExactly, 2);
   ASSERT_EQ(odd.size(), 1);
+  EXPECT_EQ(odd[0]->toolTip(1), "SimSpec/SimTitle:Title");
   setup.GoTo("ExtraParams");
   emit findings->itemActivated(odd[0], 1);
   EXPECT_EQ(setup.Frame().CurrentPath(), "SimSpec/SimTitle");
   EXPECT_EQ(setup.Focused<QLineEdit>()->text(), "Karup");
+}
+
+TEST(DocumentRun, ItsEndLeadsToTheFirstErrorAndWhatItToldGoesStale) {
+  RunOf setup("echo 'error: SimSpec/SimTitle:Title: is odd'; echo 'error: x'; echo 'error: y'; exit 3");
+  setup.GoTo("ExtraParams");
+  setup.Command("Run water movement only");
+  ASSERT_TRUE(setup.WaitForEnd());
+  EXPECT_TRUE(setup.Shows("Simulation title > Simulation Title: is odd (and 2 more)"));
+  auto* findings = setup.Frame().findChild<FindingsView*>();
+  const auto odd = [&] { return findings->findItems("is odd", Qt::MatchContains, 2).value(0)->text(2); };
+  EXPECT_EQ(odd(), "is odd — told by the engine");
+  for (QPushButton* button : setup.Frame().findChildren<QPushButton*>())
+    if (button->isVisible() && button->text() == "&Go to the Place") {
+      button->click();
+      break;
+    }
+  EXPECT_EQ(setup.Frame().CurrentPath(), "SimSpec/SimTitle");
+  const int count = findings->Count();
+  setup.Type("Karup");
+  setup.Press(Qt::Key_Return);
+  EXPECT_THAT(FromQt(odd()), testing::ContainsRegex("from the run of [0-9:]+, the setup has changed since"));
+  EXPECT_LT(findings->Count(), count);
+  setup.Frame().Undo();
+  EXPECT_EQ(odd(), "is odd — told by the engine");
+  EXPECT_EQ(findings->Count(), count);
 }
 
 TEST(DocumentRun, WithShiftNoWindowShowsTheProgress) {
@@ -193,7 +220,9 @@ TEST(DocumentRun, GoesOnWhenTheSetupIsClosedAndIsFoundAgain) {
   ASSERT_TRUE(setup.Window().CloseDocument(&setup.Frame()));
   ASSERT_TRUE(setup.Window().OpenDocument(ToQt(setup.Path())));
   EXPECT_FALSE(setup.Run().IsExecuting());
-  EXPECT_FALSE(setup.Shows("exit status 4"));
+  EXPECT_THAT(setup.Frame().findChildren<Banner*>(), IsEmpty());
+  // The first page tells the last run all the same.
+  EXPECT_TRUE(setup.Shows("exit status 4"));
 }
 
 /// Precipitation of one month.
