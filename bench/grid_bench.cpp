@@ -1,7 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// Interpolation, polygons and codes on large grids, beside GDAL and NumPy with the same input.
+// Interpolation, polygons and codes on large grids, beside GDAL, NumPy and, where it is installed, CGAL with the same
+// input.
 #include <algorithm>
 #include <chrono>
 #include <cmath>
@@ -19,6 +20,7 @@
 #include <gdal_alg.h>
 #include <ogrsf_frmts.h>
 
+#include "bench/cgal_triangulation.h"
 #include "bench/median_table.h"
 #include "geometry/grid.h"
 #include "geometry/grid_interpolation.h"
@@ -350,6 +352,12 @@ int Run(int argc, char** argv) {
   table.Add("bilinear", [&] { return Interpolated(points, InterpolationMethod::Bilinear); });
   table.Add("triangular", [&] { return Interpolated(points, InterpolationMethod::Triangular); });
   table.Add("GDAL linear", [&] { return GdalLinear(points); });
+#ifdef TERVANE_HAS_CGAL
+  const auto cgal = [&] { return CgalLinear(points.x, points.y, points.z, kSide, kEmpty); };
+  PrintDifference("triangular beside CGAL", Interpolated(points, InterpolationMethod::Triangular), cgal());
+  table.Add("CGAL triangulation", cgal);
+  table.Limit("triangular", "CGAL triangulation", 1.0);
+#endif
   table.Add(
       "polygons", [] { return NewBurnt(false); },
       [&](const std::unique_ptr<Burnt>& burnt) {

@@ -41,6 +41,8 @@ namespace {
 /// Layouts and drawing are part of what a user waits for.
 void Settle(QWidget& window) {
   QApplication::processEvents();
+  // Pages that were replaced die when the event loop goes on, which it does not do here by itself.
+  QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
   window.grab();
 }
 

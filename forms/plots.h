@@ -51,6 +51,7 @@ struct GridLayer {
   /// Smallest and largest value of all grids that are shown in turn, so that a colour means the same in each.
   std::optional<std::pair<float, float>> range = {};
   std::vector<std::pair<unsigned, std::string>> names = {};  ///< Of codes, for the legend; a code without one is told.
+  bool isHillshaded = false;  ///< Of elevations: slopes are lit from the north-west.
 
   bool operator==(const GridLayer&) const = default;
 };
@@ -63,6 +64,8 @@ struct ShapeLayer {
   std::optional<double> lineWidth = {};    ///< In pixels.
   bool isFilled = false;                   ///< Polygons have a quiet colour for each value, and a legend.
   bool withLabels = false;                 ///< Polygons bear their value where it fits.
+  /// What values are called in the legend and on the map; a value without a name is told.
+  std::vector<std::pair<std::string, std::string>> names = {};
 
   bool operator==(const ShapeLayer&) const = default;
 };

@@ -26,8 +26,8 @@ class QuadrantNeighbours {
 
   /// Finds the neighbours of the cells of rows [begin, end). Throws `Cancelled`.
   void Find(int begin, int end, ProgressPart progress);
-  /// The indices of the nearest points, one for each cell of a row that was found last; `NoPoint` where the radius
-  /// holds none for sure. Others may lie a little farther away than the radius.
+  /// The indices of the nearest points, one for each cell of a row that was found last. `NoPoint` tells that none is
+  /// within the radius; what is told may still lie farther away.
   const std::uint32_t* Row(std::size_t quadrant, int j) const { return nearest_.data() + Place(quadrant, j); }
   std::uint32_t NoPoint() const { return static_cast<std::uint32_t>(points_.size()); }
 

@@ -120,9 +120,34 @@ std::shared_ptr<const CYbShapeData> CCatchmentKvf::GetDomainShape(std::string* p
 bool CCatchmentKvf::ChooseShapeFile(FileName file, int axisUnit, std::string& problem) {
   shapeFile_->Choose(std::move(file), {});
   ShapeAxisUnit = axisUnit;
+  return FitGrid(shapeFile_->File.Absolute(), problem);
+}
+
+bool CCatchmentKvf::TakeGrid(const std::string& path, std::string& problem) {
+  if (LowerCase(ExtensionOf(path)) == ".shp") {
+    if (!FitGrid(path, problem)) return false;
+    rotationShp = 0;
+    if (const auto facts = ShapeFactsOf(path); !facts->projection.empty()) MapProjShp = facts->projection;
+    return true;
+  }
+  GridGeometry grid;
+  const FileResult result = ReadGeoInfoFromNdsFile(path, 1, grid);
+  problem = result.error;
+  if (!result.Ok()) return false;
+  nxShp = grid.nx;
+  nyShp = grid.ny;
+  sizeShp = grid.cellSize;
+  x0Shp = grid.x0;
+  y0Shp = grid.y0;
+  rotationShp = grid.rotation;
+  MapProjShp = grid.projection;
+  return true;
+}
+
+bool CCatchmentKvf::FitGrid(const std::string& shapeFile, std::string& problem) {
   CTvnShapeData shapes;
-  shapes.SetAxisLengthUnit(axisUnit);
-  const FileResult result = shapes.ReadShapeFile(shapeFile_->File.Absolute());
+  shapes.SetAxisLengthUnit(ShapeAxisUnit);
+  const FileResult result = shapes.ReadShapeFile(shapeFile);
   Envelope box;
   if (!result.Ok() || !shapes.GetTranscribingRect(box)) {
     problem = result.Ok() ? "it holds no shapes" : result.error;

@@ -58,12 +58,19 @@ class CCatchmentKvf : public CTvnKvfBase {
   /// False, with the reason, when it cannot be read: the grid's values then stay.
   bool ChooseShapeFile(FileName file, int axisUnit, std::string& problem);
 
+  /// Takes the grid of a raster, or one around the shapes of a file in the unit of the domain's shapes, with its
+  /// projection where the file tells one. False, with the reason, when it cannot be read: nothing changes then.
+  bool TakeGrid(const std::string& path, std::string& problem);
+
   int ValidateData() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 
  private:
+  /// Puts the corner and the cell size of the grid where the shapes lie.
+  bool FitGrid(const std::string& shapeFile, std::string& problem);
+
   /// All that decides the domain of a shape file.
   struct ShapeSource {
     std::string file;

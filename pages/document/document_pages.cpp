@@ -10,6 +10,7 @@
 #include "overlays/pages.h"
 #include "pages/document/coverage_page.h"
 #include "pages/document/help_pages.h"
+#include "pages/parts/domain_map.h"
 #include "pages/parts/plot_content.h"
 #include "platform/files.h"
 #include "platform/item_types.h"
@@ -96,6 +97,18 @@ void CDisplayDlg::SetData() {
   if (const auto* domain = Node().Important(kDomain)) Node().AdoptDomain(domain->GetEnvelope());
 }
 
+LineLayer CDisplayDlg::ShownArea() {
+  const COverlaysKvf& n = Node();
+  const std::vector<MapPoint> corners{{n.x0, n.y0}, {n.x1, n.y0}, {n.x1, n.y1}, {n.x0, n.y1}, {n.x0, n.y0}};
+  // Another one only where the area is another, since a map is drawn anew for other lines.
+  if (!frame_ || frame_->front().points != corners) {
+    auto frame = std::make_shared<std::vector<MapLine>>(1);
+    frame->front().points = corners;
+    frame_ = std::move(frame);
+  }
+  return {.lines = frame_, .withNames = false};
+}
+
 void CDisplayDlg::Describe(PageForm& form) {
   COverlaysKvf& n = Node();
   const Condition isFree = !On(n.UseModelDomain);
@@ -113,13 +126,11 @@ void CDisplayDlg::Describe(PageForm& form) {
   corner(upper, "X", n.x1);
   corner(upper, "Y", n.y1);
   form.Button("Import...", [this] { Import(); }).EnabledWhen(isFree);
-  form.Map([&n] {
-    const auto* domain = n.Important(kDomain);
-    if (!domain) return MapContent();
-    MapContent map = domain->Type == CCatchmentKvf::kGridFile
-                         ? FileMap(domain->GridFile())
-                         : ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
+  form.Map([this, &n] {
+    MapContent map = DomainMap(n);
+    if (map.grids.empty() && map.awaited.empty()) AddBackdrop(n, map);
     for (GridLayer& grid : map.grids) grid.withLegend = false;
+    map.lines.push_back(ShownArea());
     map.area = Envelope{n.x0, n.y0, n.x1, n.y1};
     return map;
   });

@@ -43,6 +43,10 @@ class CDisplayDlg : public PageOf<COverlaysKvf> {
  private:
   /// Takes the corners from a grid, an image's place or a shape file.
   void Import();
+  /// The frame of the area that maps show.
+  LineLayer ShownArea();
+
+  std::shared_ptr<const std::vector<MapLine>> frame_;
 };
 
 /// The pages of the document as a whole: coverage and display.

@@ -23,9 +23,13 @@ MapContent DomainMap(const CYbSEKvfBase& node) {
   }
   if (domain->ShapeFile().File.IsEmpty()) return GridMap(node, nullptr, "No file is chosen.");
   MapContent map = GridMap(node, domain->DomainFromShape());
-  if (!map.grids.empty()) map.grids.front().isCodes = true;
+  if (!map.grids.empty()) {
+    map.grids.front().isCodes = true;
+    map.grids.front().names = {{1, "inside"}, {2, "outer boundary"}};
+  }
+  // The first layer is the file's own; the backdrop is there with the grid.
   MapContent outline = ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
-  std::ranges::move(outline.shapes, std::back_inserter(map.shapes));
+  if (!outline.shapes.empty()) map.shapes.insert(map.shapes.begin(), std::move(outline.shapes.front()));
   std::ranges::move(outline.awaited, std::back_inserter(map.awaited));
   return map;
 }

@@ -153,16 +153,22 @@ MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRo
   MapContent map;
   map.message = problem;
   if (!grid) return map;
-  const COverlaysKvf* overlays = node.Important(kOverlays);
-  if (overlays) AddLayers(overlays->Background(), map);
   GridLayer layer;
   layer.isCodes = grid->ItemType() == quantity::kCode;
   layer.grid = std::move(grid);
-  if (!map.grids.empty() && overlays) layer.transparency = static_cast<double>(overlays->CurrentTransparency());
-  // The data come first for what a user points at, whatever lies below them.
-  map.grids.insert(map.grids.begin(), std::move(layer));
-  if (overlays) AddLayers(overlays->Foreground(), map);
+  if (const COverlaysKvf* overlays = node.Important(kOverlays))
+    layer.transparency = static_cast<double>(overlays->CurrentTransparency());
+  map.grids.push_back(std::move(layer));
+  AddBackdrop(node, map);
   return map;
+}
+
+void AddBackdrop(const CYbSEKvfBase& node, MapContent& map) {
+  // The data stay first for what a user points at, whatever lies below them.
+  const COverlaysKvf* overlays = node.Important(kOverlays);
+  if (!overlays) return;
+  AddLayers(overlays->Background(), map);
+  AddLayers(overlays->Foreground(), map);
 }
 
 MapContent GridMap(const CYbSEKvfBase& node, const std::shared_ptr<ComputedGrid>& grid) {
@@ -192,10 +198,12 @@ MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit) {
   map.message = file.WhyNotValid();
   if (!map.message.empty()) return map;
   const auto shapes = RecentShapes(file.File.Absolute(), file.Attribute(), axisUnit);
-  if (auto data = NowOrAwaited(shapes, map.awaited))
+  if (auto data = NowOrAwaited(shapes, map.awaited)) {
     map.shapes.push_back({std::move(data), {}});
-  else if (shapes->IsDone())
+    AddBackdrop(file, map);
+  } else if (shapes->IsDone()) {
     map.message = shapes->Problem();
+  }
   return map;
 }
 

@@ -25,6 +25,8 @@ MapContent GridFileMap(const CYbSEKvfBase& node, const std::string& path, int it
 MapContent FileMap(const DataFileNode& file, const GridSlice& slice = {});
 /// A map of a shape file with its attribute.
 MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit);
+/// Puts the setup's layers behind and over what the map of a node shows.
+void AddBackdrop(const CYbSEKvfBase& node, MapContent& map);
 /// A chart of the selected item of a file of series, with the simulation's period.
 SeriesContent FileChart(const DataFileNode& file);
 

@@ -148,13 +148,26 @@ void DescribeZoneSource(PageForm& form, const CYbSEDlgBase& page, ZoneSource& so
 }
 
 MapContent ZoneMap(const ZoneSource& source, const CFMSEKvfGroupBase* highlighted) {
+  std::vector<const CodedZoneProp*> zones;
+  for (const CYbSEKvfBase* child = source.Owner().GetFirstChild(); child; child = source.Owner().GetNextChild(child))
+    if (const auto* zone = dynamic_cast<const CodedZoneProp*>(child)) zones.push_back(zone);
   if (source.UsesPolygons()) {
     MapContent map = ShapeFileMap(source.ShapeFile(), source.ShapeAxisUnit);
+    if (!map.shapes.empty()) {
+      ShapeLayer& areas = map.shapes.front();
+      areas.isFilled = !highlighted;
+      areas.withLabels = true;
+      for (const CodedZoneProp* zone : zones) areas.names.emplace_back(zone->GRIDCODEID, zone->NAME);
+    }
     if (highlighted) LetStandOut(map, {.name = highlighted->GetStationId()});
     return map;
   }
   MapContent map = FileMap(source.GridFile());
-  if (!map.grids.empty()) map.grids.front().isCodes = true;
+  if (!map.grids.empty()) {
+    map.grids.front().isCodes = true;
+    for (const CodedZoneProp* zone : zones)
+      map.grids.front().names.emplace_back(static_cast<unsigned>(zone->StationCode()), zone->NAME);
+  }
   if (highlighted) LetStandOut(map, {.code = static_cast<float>(highlighted->StationCode())});
   return map;
 }

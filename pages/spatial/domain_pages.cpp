@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/spatial/domain_pages.h"
 
+#include <algorithm>
+
 #include "forms/map_question.h"
 #include "geometry/cart.h"
 #include "pages/parts/create_dialogs.h"
@@ -33,6 +35,7 @@ class CCatchmentDlg : public PageOf<CCatchmentKvf> {
   bool BrowseShape(Host& host, const Host::FileQuestion& question);
   /// Takes a shape file with the unit of its coordinates, which is asked for; false when the user gave up.
   bool TakeShape(Host& host, const FileName& file);
+  void TakeGrid();
   MapContent Map();
 
   MapQuestion question_;
@@ -145,6 +148,10 @@ void CCatchmentDlg::Describe(PageForm& form) {
               })
       .ToolTip("Takes X0 and Y0 from a click on the map")
       .EnabledWhen(fromShape);
+  grid.Button("Take Grid from File...", [this] { TakeGrid(); })
+      .Beside()
+      .ToolTip("Takes all values of the grid and the projection from a raster, or fits them to a shape file")
+      .EnabledWhen(fromShape);
   GridNumber(grid, "Rotation:", n.rotationShp, &GridGeometry::rotation);
   // Shown by its name; any text that tells a coordinate system may be typed.
   grid.Text(
@@ -166,6 +173,20 @@ void CCatchmentDlg::Describe(PageForm& form) {
       .EnabledWhen(fromShape);
 
   form.Map([this] { return Map(); });
+}
+
+void CCatchmentDlg::TakeGrid() {
+  const auto path = AskFile({"Take Grid from File",
+                             "Rasters and shape files (*.nds2;*.tif;*.asc;*.shp)|*.nds2;*.tif;*.asc;*.shp|All Files "
+                             "(*.*)|*.*||",
+                             "nds2",
+                             {}},
+                            {});
+  if (!path) return;
+  std::string problem;
+  if (!Node().TakeGrid(*path, problem)) return Outside().ShowMessage(problem, Host::Icon::Error);
+  Node().SetRevalidateAll();
+  UpdateDoc(kDataChanged, "Take Grid from File");
 }
 
 MapContent CCatchmentDlg::Map() {

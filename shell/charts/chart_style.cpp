@@ -74,7 +74,8 @@ void StyleChart(QCustomPlot& chart) {
   chart.legend->setBrush(Qt::NoBrush);
   chart.legend->setBorderPen(Qt::NoPen);
   chart.legend->setVisible(true);
-  chart.legend->setIconSize(theme.Scaled(24), QFontMetrics(QApplication::font()).height());
+  // A row as high as its text would cut what hangs below the line.
+  chart.legend->setIconSize(theme.Scaled(24), QFontMetrics(QApplication::font()).lineSpacing() + theme.Scaled(3));
   chart.selectionRect()->setPen(QPen(colors.color(QPalette::Highlight), 1.5));
   QColor veil = colors.color(QPalette::Highlight);
   veil.setAlpha(50);

@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/charts/series_plot.h"
 
+#include <QActionGroup>
 #include <QApplication>
-#include <QClipboard>
 #include <QLabel>
 #include <algorithm>
 #include <array>
@@ -17,6 +17,7 @@
 #include "shell/charts/chart_markers.h"
 #include "shell/charts/chart_panels.h"
 #include "shell/charts/chart_style.h"
+#include "shell/charts/dense_graph.h"
 #include "shell/charts/time_bars.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -78,8 +79,17 @@ SeriesPlot::SeriesPlot(Host& host, QWidget* parent)
   message_->setAutoFillBackground(true);
   message_->setBackgroundRole(QPalette::Base);
   Hold({chart_, [this](double factor) { Zoom(factor); }, [this] { Fit(); },
-        [this](double pixelRatio) { return Picture(pixelRatio); }});
-  AddCommand(tr("Copy &values"), [this] { QApplication::clipboard()->setText(ValuesAsText()); });
+        [this](double pixelRatio) { return Picture(pixelRatio); }, [this] { return ValuesAsText(); }});
+  views_ = new QActionGroup(this);
+  const std::pair<SeriesView, QString> views[] = {{SeriesView::AsGiven, tr("As &given")},
+                                                  {SeriesView::Cumulated, tr("C&umulated")},
+                                                  {SeriesView::Monthly, tr("&Monthly")}};
+  for (const auto& [view, name] : views) {
+    QAction* action = AddCommand(name, [this, view = view] { SetView(view); });
+    action->setCheckable(true);
+    action->setChecked(view == view_);
+    views_->addAction(action);
+  }
   connect(chart_, &QCustomPlot::mousePress, this, [this](const QMouseEvent* event) {
     chart_->setSelectionRectMode(event->modifiers() & Qt::ShiftModifier ? QCP::srmZoom : QCP::srmNone);
   });
@@ -101,11 +111,13 @@ QWidget* SeriesPlot::FocusTarget() const { return chart_; }
 
 void SeriesPlot::Show(SeriesContent content) {
   std::optional<DateRequest> request = std::exchange(content.request, {});
-  if (isShown_ && LooksSame(content, content_)) {
+  if (isShown_ && LooksSame(content, given_)) {
     markers_->SetMoves(content.markers);
   } else {
     isShown_ = true;
-    content_ = std::move(content);
+    given_ = std::move(content);
+    content_ = InView();
+    for (QAction* action : views_->actions()) action->setVisible(!given_.numbers);
     Build();
   }
   markers_->Ask(content_.IsEmpty() ? std::nullopt : std::move(request));
@@ -120,11 +132,24 @@ void SeriesPlot::ShowWhenThere(const std::function<SeriesContent()>& content) {
   Show(std::move(now));
 }
 
+void SeriesPlot::SetView(SeriesView view) {
+  view_ = view;
+  content_ = InView();
+  Build();
+}
+
+SeriesContent SeriesPlot::InView() const {
+  SeriesContent shown = given_;
+  for (Series& series : shown.series) series = ViewOf(series, view_);
+  return shown;
+}
+
 void SeriesPlot::Build() {
   chart_->clearPlottables();
   chart_->clearItems();
   curves_.clear();
   periods_.clear();
+  hatches_.clear();
   pointers_.clear();
   bars_ = nullptr;
   int panels = 1;
@@ -158,7 +183,9 @@ void SeriesPlot::BuildPanel(int panel) {
   right.setVisible(true);
   right.setTickLabels(hasSecond);
   right.setTicks(hasSecond);
-  if (!content_.IsEmpty()) AddPeriodAndPointer(keys, left);
+  if (content_.IsEmpty()) return;
+  AddPeriodAndPointer(keys, left);
+  if (!content_.numbers) MarkMissing(panel);
 }
 
 void SeriesPlot::BuildStrip() {
@@ -168,22 +195,14 @@ void SeriesPlot::BuildStrip() {
 }
 
 void SeriesPlot::AddPeriodAndPointer(QCPAxis& keys, QCPAxis& values) {
+  if (content_.period && !content_.numbers && content_.period->first.IsValid() && content_.period->second.IsValid())
+    periods_.push_back(AddSpan(keys, values, content_.period->first, content_.period->second));
   const auto over = [&](QCPItemPosition* place) {
     place->setAxes(&keys, &values);
     place->setAxisRect(values.axisRect());
     place->setTypeX(QCPItemPosition::ptPlotCoords);
     place->setTypeY(QCPItemPosition::ptAxisRectRatio);
   };
-  if (content_.period && !content_.numbers && content_.period->first.IsValid() && content_.period->second.IsValid()) {
-    auto* period = new QCPItemRect(chart_);
-    period->setLayer("background");
-    period->setClipAxisRect(values.axisRect());
-    over(period->topLeft);
-    over(period->bottomRight);
-    period->topLeft->setCoords(AxisCoordinate(content_.period->first), 0);
-    period->bottomRight->setCoords(AxisCoordinate(content_.period->second), 1);
-    periods_.push_back(period);
-  }
   auto* pointer = new QCPItemStraightLine(chart_);
   pointer->setLayer(kPointerLayer);
   pointer->setVisible(false);
@@ -193,8 +212,43 @@ void SeriesPlot::AddPeriodAndPointer(QCPAxis& keys, QCPAxis& values) {
   pointers_.push_back(pointer);
 }
 
+QCPItemRect* SeriesPlot::AddSpan(QCPAxis& keys, QCPAxis& values, const CYbDateTime& from, const CYbDateTime& to) {
+  auto* span = new QCPItemRect(chart_);
+  span->setLayer("background");
+  span->setClipAxisRect(values.axisRect());
+  for (QCPItemPosition* place : {span->topLeft, span->bottomRight}) {
+    place->setAxes(&keys, &values);
+    place->setAxisRect(values.axisRect());
+    place->setTypeX(QCPItemPosition::ptPlotCoords);
+    place->setTypeY(QCPItemPosition::ptAxisRectRatio);
+  }
+  span->topLeft->setCoords(AxisCoordinate(from), 0);
+  span->bottomRight->setCoords(AxisCoordinate(to), 1);
+  return span;
+}
+
+void SeriesPlot::MarkMissing(int panel) {
+  const auto add = [&](const CYbDateTime& from, const CYbDateTime& to) {
+    hatches_.push_back(AddSpan(panels_->Keys(panel), panels_->Values(panel, false), from, to));
+  };
+  constexpr std::size_t kMostGaps = 100;
+  std::optional<std::pair<CYbDateTime, CYbDateTime>> covered;
+  for (const Series& series : given_.series) {
+    if (series.panel != panel || series.times.size() < 2) continue;
+    const CYbDateTime first = series.times.front(), last = series.times.back();
+    if (!first.IsValid() || !last.IsValid()) continue;
+    covered = covered ? std::pair(std::min(covered->first, first), std::max(covered->second, last))
+                      : std::pair(first, last);
+    for (const auto& [from, to] : GapsOf(series, kMostGaps)) add(from, to);
+  }
+  if (!covered || periods_.empty()) return;
+  const auto [start, end] = *content_.period;
+  if (start < covered->first) add(start, std::min(end, covered->first));
+  if (covered->second < end) add(std::max(start, covered->second), end);
+}
+
 void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) {
-  QCPGraph* graph = chart_->addGraph(keys, values);
+  auto* graph = new DenseGraph(keys, values);
   const auto shown = QSharedPointer<QCPGraphDataContainer>::create();
   QVector<QCPGraphData> points;
   const std::size_t count = std::min(PlaceCount(series), series.values.size());
@@ -214,7 +268,7 @@ void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) 
   graph->setData(shown);
   graph->setName(NameOf(series));
   graph->setAdaptiveSampling(true);
-  // A value between two gaps makes no line, and is seen as a point where points do not run together.
+  // Each value is seen as a point where points do not run together.
   constexpr qsizetype kFewPoints = 60;
   if (points.size() <= kFewPoints && !series.isStepped)
     graph->setScatterStyle(QCPScatterStyle(QCPScatterStyle::ssDisc, Theme::Get().Scaled(4)));
@@ -243,6 +297,12 @@ void SeriesPlot::ApplyTheme() {
   for (QCPItemRect* period : periods_) {
     period->setBrush(shade);
     period->setPen(Qt::NoPen);
+  }
+  QColor missing = theme.WarningColor();
+  missing.setAlpha(90);
+  for (QCPItemRect* hatch : hatches_) {
+    hatch->setBrush(QBrush(missing, Qt::BDiagPattern));
+    hatch->setPen(Qt::NoPen);
   }
   for (QCPItemStraightLine* pointer : pointers_) pointer->setPen(QPen(quiet, 1, Qt::DashLine));
   QPalette quietText = colors;
@@ -277,6 +337,9 @@ void SeriesPlot::Fit() {
   bool hasBars = false;
   const QCPRange barred = bars_ ? bars_->getKeyRange(hasBars, QCP::sdBoth) : QCPRange();
   if (hasBars) keys = keys ? keys->expanded(barred) : barred;
+  // The simulation is seen as a whole, also where the series do not cover it.
+  if (keys && !periods_.empty())
+    keys = keys->expanded({AxisCoordinate(content_.period->first), AxisCoordinate(content_.period->second)});
   for (QCPAxis* axis : panels_->AllValues()) {
     axis->rescale();
     // Curves keep off the frame, but what starts at zero stands on it. Names stand above the curves.

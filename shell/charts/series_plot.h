@@ -7,9 +7,10 @@
 #include <optional>
 #include <vector>
 
-#include "forms/plots.h"
+#include "forms/series_views.h"
 #include "shell/widgets/plot_frame.h"
 
+class QActionGroup;
 class QCPAxis;
 class QCPGraph;
 class QCPItemStraightLine;
@@ -54,6 +55,9 @@ class SeriesPlot : public PlotFrame {
  private:
   struct Curve;
 
+  /// Shows the series in another way.
+  void SetView(SeriesView view);
+  SeriesContent InView() const;
   void Build();
   /// One of the charts below each other.
   void BuildPanel(int panel);
@@ -61,6 +65,9 @@ class SeriesPlot : public PlotFrame {
   void BuildStrip();
   /// The simulated time and the line at the pointer.
   void AddPeriodAndPointer(QCPAxis& keys, QCPAxis& values);
+  QCPItemRect* AddSpan(QCPAxis& keys, QCPAxis& values, const CYbDateTime& from, const CYbDateTime& to);
+  /// Marks the parts of the simulation that the series of a chart do not cover, and their gaps.
+  void MarkMissing(int panel);
   void AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values);
   void ApplyTheme();
   /// As many columns of names and ticks as there is room for.
@@ -69,7 +76,9 @@ class SeriesPlot : public PlotFrame {
   bool Press(int key);
   QImage Picture(double pixelRatio);
 
-  SeriesContent content_;
+  SeriesContent given_, content_;  ///< As the page tells it, and as it is shown.
+  SeriesView view_ = SeriesView::AsGiven;
+  QActionGroup* views_;
   bool isShown_ = false;
   QCustomPlot* chart_;
   QLabel* message_;
@@ -78,6 +87,7 @@ class SeriesPlot : public PlotFrame {
   ChartMarkers* markers_ = nullptr;
   TimeBarPlottable* bars_ = nullptr;   ///< Null without bars.
   std::vector<QCPItemRect*> periods_;  ///< Of each chart.
+  std::vector<QCPItemRect*> hatches_;  ///< Where there are no data.
   std::vector<QCPItemStraightLine*> pointers_;
 };
 

@@ -66,7 +66,8 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
       // How transparent a layer is, or whether it has a legend, does not change its colours.
       return layer && layer->grid.grid == grid.grid && layer->grid.isCodes == grid.isCodes &&
              layer->grid.highlighted.code == grid.highlighted.code && layer->grid.range == grid.range &&
-             layer->grid.names == grid.names && layer->unitKey == unitKey;
+             layer->grid.names == grid.names && layer->grid.isHillshaded == grid.isHillshaded &&
+             layer->unitKey == unitKey;
     });
     if (same != old.end()) {
       layers_.push_back(std::move(*same));
@@ -141,7 +142,7 @@ void MapCanvas::Arrange() {
   const double margin = Scaled(kMargin);
   const QFontMetricsF metrics(font());
   QRectF map = QRectF(rect()).adjusted(margin, margin, -margin, -margin);
-  hasTicks_ = map.width() > Scaled(460) && map.height() > Scaled(280);
+  hasTicks_ = map.width() > Scaled(240) && map.height() > Scaled(170);
   if (hasTicks_) map.adjust(metrics.height() + Scaled(6), 0, 0, -metrics.height() - Scaled(6));
   legendPlace_ = {};
   // On a small map the legend stands back where it would take more than nearly half of the place.
@@ -321,7 +322,7 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio, bool isScreen) {
   if (IsPreparing()) DrawPreparing(painter);
   painter.restore();
   DrawFrame(painter);
-  DrawLegends(painter);
+  DrawLegends(painter, isScreen);
 }
 
 void MapCanvas::DrawVectorPart(QPainter& painter, const DrawnMap& map) const {

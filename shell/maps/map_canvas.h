@@ -94,7 +94,9 @@ class MapCanvas : public QWidget {
   QString DrawnText(MapPoint place) const;
   /// What the legend tells, from the top down.
   std::vector<LegendBlock> Legends() const;
-  void DrawLegends(QPainter& painter);
+  /// On the screen what has no room is reached by scrolling; on paper it is counted.
+  void DrawLegends(QPainter& painter, bool isScreen);
+  void ScrollLegend(double pixels);
   double DrawLegend(QPainter& painter, const LegendBlock& legend, QRectF place);
   void DrawFrame(QPainter& painter);
   QRectF NorthArrowPlace() const;
@@ -119,6 +121,8 @@ class MapCanvas : public QWidget {
   std::vector<MapPoint> drawn_;  ///< Points of a line that is asked for.
   MapWindow window_;
   QRectF legendPlace_;
+  double legendScroll_ = 0;  ///< How many pixels of the legend are above its place.
+  double legendMost_ = 0;    ///< How far it can be scrolled.
   bool hasTicks_ = false;
   bool isFitted_ = true;  ///< The whole area is seen, and is to be after a change of size too.
   QPixmap scene_;         ///< As last drawn; null when it must be drawn anew.

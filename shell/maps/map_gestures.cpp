@@ -105,6 +105,10 @@ void MapCanvas::mouseDoubleClickEvent(QMouseEvent* event) {
 void MapCanvas::wheelEvent(QWheelEvent* event) {
   const int turned = event->angleDelta().y();
   if (content_.IsEmpty() || turned == 0) return event->ignore();
+  if (legendPlace_.contains(event->position())) {
+    ScrollLegend(-turned / 2.0);
+    return event->accept();
+  }
   Zoom(std::pow(kZoomStep, turned / 120.0), event->position());
   event->accept();
 }
@@ -127,6 +131,10 @@ void MapCanvas::keyPressEvent(QKeyEvent* event) {
       return Pan({0, step});
     case Qt::Key_Down:
       return Pan({0, -step});
+    case Qt::Key_PageUp:
+      return ScrollLegend(-legendPlace_.height() / 2);
+    case Qt::Key_PageDown:
+      return ScrollLegend(legendPlace_.height() / 2);
     case Qt::Key_Home:
       return Fit();
     case Qt::Key_Escape:

@@ -92,12 +92,39 @@ double MapCanvas::LegendWidth() const {
   return width > 0 ? std::ceil(std::max(width, Scaled(90))) + 2 : 0;
 }
 
-void MapCanvas::DrawLegends(QPainter& painter) {
+void MapCanvas::ScrollLegend(double pixels) {
+  const double before = legendScroll_;
+  legendScroll_ = std::clamp(legendScroll_ + pixels, 0.0, legendMost_);
+  if (legendScroll_ != before) Redraw();
+}
+
+void MapCanvas::DrawLegends(QPainter& painter, bool isScreen) {
+  legendMost_ = isScreen ? 0 : legendMost_;
   if (legendPlace_.isEmpty()) return;
   const std::vector<LegendBlock> legends = Legends();
   const QFontMetricsF metrics(painter.font());
   double wanted = 0;
   for (const LegendBlock& legend : legends) wanted += WantedHeight(legend, metrics);
+  const bool hasKinds = std::ranges::any_of(legends, [](const LegendBlock& legend) { return !legend.isScale; });
+  if (isScreen && hasKinds && wanted > legendPlace_.height()) {
+    // One line more, since a long title breaks.
+    legendMost_ = wanted + metrics.height() - legendPlace_.height();
+    legendScroll_ = std::min(legendScroll_, legendMost_);
+    painter.save();
+    painter.setClipRect(legendPlace_.adjusted(-1, -1, 1, 1));
+    QRectF place = legendPlace_.translated(0, -legendScroll_);
+    place.setHeight(wanted + legendPlace_.height());
+    for (const LegendBlock& legend : legends)
+      place.setTop(place.top() + DrawLegend(painter, legend, place) + Scaled(kBetween));
+    painter.restore();
+    const double length = legendPlace_.height() / (legendMost_ + legendPlace_.height());
+    QColor bar = Theme::Get().QuietColor();
+    bar.setAlpha(140);
+    painter.fillRect(QRectF(legendPlace_.right() - Scaled(4),
+                            legendPlace_.top() + legendScroll_ * length, Scaled(4), legendPlace_.height() * length),
+                     bar);
+    return;
+  }
   // Where not all has room, each gives up its share.
   const double share = std::min(1.0, legendPlace_.height() / std::max(wanted, 1.0));
   QRectF place = legendPlace_;

@@ -8,6 +8,7 @@
 #include <cmath>
 #include <limits>
 
+#include "platform/item_types.h"
 #include "shell/widgets/qt_text.h"
 
 namespace tervane {
@@ -17,6 +18,9 @@ namespace {
 /// From low to high: lighter to darker, so that the order is seen without colours too, and neither end is lost on white
 /// or dark paper.
 constexpr std::array<QRgb, 7> kRamp{0xfff6e7a1, 0xffc3dc8c, 0xff83c795, 0xff48aca5, 0xff3388ad, 0xff3a62a8, 0xff4b3c8f};
+
+/// Of the ground, from valleys to peaks.
+constexpr std::array<QRgb, 7> kTerrain{0xff7fa868, 0xffaac37c, 0xffdccf96, 0xffc7a26b, 0xffa27a58, 0xff9b8b83, 0xfff1efec};
 
 /// Colours that are told apart side by side.
 constexpr std::array<QRgb, 20> kDistinct{0xff4e79a7, 0xfff28e2b, 0xff59a14f, 0xffe15759, 0xffb07aa1,
@@ -56,12 +60,13 @@ Range RangeOf(const CTvn2DOrthoRotatedGridData& grid, double smallest, double la
 
 }  // namespace
 
-QRgb RampColor(double part) {
-  const double at = std::clamp(part, 0.0, 1.0) * static_cast<double>(kRamp.size() - 1);
-  const auto low = std::min(static_cast<std::size_t>(at), kRamp.size() - 2);
+QRgb RampColor(double part, Ramp ramp) {
+  const auto& colors = ramp == Ramp::Terrain ? kTerrain : kRamp;
+  const double at = std::clamp(part, 0.0, 1.0) * static_cast<double>(colors.size() - 1);
+  const auto low = std::min(static_cast<std::size_t>(at), colors.size() - 2);
   const double weight = at - static_cast<double>(low);
   const auto mix = [&](int a, int b) { return static_cast<int>(std::lround(a + weight * (b - a))); };
-  const QRgb a = kRamp[low], b = kRamp[low + 1];
+  const QRgb a = colors[low], b = colors[low + 1];
   return qRgb(mix(qRed(a), qRed(b)), mix(qGreen(a), qGreen(b)), mix(qBlue(a), qBlue(b)));
 }
 
@@ -211,13 +216,14 @@ void MapPalette::MakeClasses(const GridLayer& layer, const ShownUnit& unit) {
     constexpr float kMost = std::numeric_limits<float>::max();
     range = RangeOf(*layer.grid, std::max(smallest, -kMost), std::min(largest, kMost));
   }
+  const Ramp ramp = layer.grid->ItemType() == quantity::kElevation ? Ramp::Terrain : Ramp::Amounts;
   // The numbers are to be nice in the unit in which the user sees them.
   legend_.isScale = true;
   const std::vector<double> shown = ClassBorders(unit.Shown(range.low), unit.Shown(range.high));
   for (const double border : shown) borders_.push_back(unit.Stored(border));
   if (shown.size() == 1) {
     borders_.push_back(borders_.front());
-    colors_.push_back(RampColor(0.5));
+    colors_.push_back(RampColor(0.5, ramp));
     legend_.rows.push_back({QColor(colors_.back()), ToQt(FormatNumber(shown.front(), "%.6g"))});
     return;
   }
@@ -225,13 +231,26 @@ void MapPalette::MakeClasses(const GridLayer& layer, const ShownUnit& unit) {
   perClass_ = static_cast<double>(classes) / (borders_.back() - borders_.front());
   const double step = shown[1] - shown[0];
   for (std::size_t i = 0; i < classes; ++i) {
-    colors_.push_back(RampColor(static_cast<double>(i) / static_cast<double>(classes - 1)));
+    colors_.push_back(RampColor(static_cast<double>(i) / static_cast<double>(classes - 1), ramp));
     const QString from = NumberInSteps(shown[i], step), to = NumberInSteps(shown[i + 1], step);
     QString text = QString::fromUtf8("%1 – %2").arg(from, to);
     if (i == 0 && range.isOpenBelow) text = QCoreApplication::translate("MapPalette", "below %1").arg(to);
     if (i + 1 == classes && range.isOpenAbove) text = QCoreApplication::translate("MapPalette", "above %1").arg(from);
     legend_.rows.insert(legend_.rows.begin(), {QColor(colors_.back()), text});
   }
+}
+
+void MapPalette::MakeShades() {
+  std::vector<QRgb> shaded{colors_.front()};
+  for (std::size_t i = 1; i < colors_.size(); ++i)
+    for (int shade = 0; shade < kShades; ++shade) {
+      // The middle one is the colour itself.
+      constexpr double kDarkest = 0.45, kLightest = 1.35;
+      const double light = kDarkest + (kLightest - kDarkest) * shade / (kShades - 1);
+      const auto lit = [&](int part) { return std::min(255, static_cast<int>(std::lround(part * light))); };
+      shaded.push_back(qRgb(lit(qRed(colors_[i])), lit(qGreen(colors_[i])), lit(qBlue(colors_[i]))));
+    }
+  colors_ = std::move(shaded);
 }
 
 void MapPalette::MakeCodes(const GridLayer& layer) {

@@ -24,8 +24,10 @@ std::vector<double> ClassBorders(double smallest, double largest);
 /// A number with as many decimals as multiples of the step need.
 QString NumberInSteps(double value, double step);
 
+/// What colours from low to high speak of.
+enum class Ramp { Amounts, Terrain };
 /// From low to high, `part` within 0 and 1.
-QRgb RampColor(double part);
+QRgb RampColor(double part, Ramp ramp = Ramp::Amounts);
 /// Colours that are told apart side by side, one for each whole number from 0.
 QRgb CodeColor(std::size_t ordinal);
 
@@ -36,7 +38,7 @@ struct LegendRow {
 
 /// What the legend says of one layer.
 struct LegendBlock {
-  static constexpr std::size_t kMostRows = 20;  ///< Of kinds.
+  static constexpr std::size_t kMostRows = 1000;  ///< Of kinds.
 
   QString title;
   std::vector<LegendRow> rows;  ///< From the top down.
@@ -86,6 +88,12 @@ class MapPalette {
   static MapPalette Of(const GridLayer& layer, const DisplayUnits* units);
 
   std::uint8_t ColorNumber(float value) const;
+  /// Splits each colour into as many, from its darkest to its lightest; `Shaded` tells them apart.
+  static constexpr int kShades = 16;
+  void MakeShades();
+  std::uint8_t Shaded(std::uint8_t colorNumber, int shade) const {
+    return colorNumber == 0 ? colorNumber : static_cast<std::uint8_t>(1 + (colorNumber - 1) * kShades + shade);
+  }
   /// Opaque colours by their numbers, and a transparent one in front.
   const std::vector<QRgb>& Colors() const { return colors_; }
   /// What the user reads, from the top down: classes from the highest to the lowest, codes ascending.

@@ -27,6 +27,60 @@ void Narrow(double start, double step, double limit, int& first, int& last) {
   last = std::min(last, static_cast<int>(std::min(to + 2, static_cast<double>(last))));
 }
 
+/// How the ground is lit from the north-west, cell by cell.
+class Hillshade {
+ public:
+  explicit Hillshade(const CTvn2DOrthoRotatedGridData& grid) : grid_(grid), geometry_(grid.Geometry()) {
+    constexpr double kAzimuth = 135;  // Towards the light, counter-clockwise from east, as the grid's turn counts.
+    const double turned = (kAzimuth - geometry_.rotation) * std::acos(-1.0) / 180;
+    toLight_ = {std::cos(turned), std::sin(turned)};
+    // Slopes of coarse cells are slight: heights are stretched until the usual one is seen.
+    constexpr std::size_t kSamples = 10'000;
+    constexpr double kUsual = 0.35;
+    const std::size_t cells = geometry_.CellCount(), stride = std::max<std::size_t>(1, cells / kSamples) | 1;
+    double sum = 0;
+    std::size_t count = 0;
+    for (std::size_t cell = 0; cell < cells; cell += stride) {
+      const auto [dx, dy] = SlopeAt(cell);
+      sum += std::hypot(dx, dy);
+      ++count;
+    }
+    if (sum > 0) stretch_ = kUsual * static_cast<double>(count) / sum;
+  }
+
+  /// From 0, in the shade, to `MapPalette::kShades` - 1.
+  int ShadeOf(std::size_t cell) const {
+    const auto [dx, dy] = SlopeAt(cell);
+    const double rise = -stretch_ * (dx * toLight_.x + dy * toLight_.y);
+    const double steep = stretch_ * std::hypot(dx, dy);
+    // The light stands 45 degrees high: of flat ground half of the way from shade to full light is seen.
+    const double light = (1 + rise) / std::sqrt(1 + steep * steep);
+    const double part = 0.5 + 0.5 * (light - 1);
+    return static_cast<int>(std::clamp(std::lround(part * MapPalette::kShades), 0L, MapPalette::kShades - 1L));
+  }
+
+ private:
+  /// How much the values rise to the next cell along the grid's axes.
+  std::pair<double, double> SlopeAt(std::size_t cell) const {
+    const std::vector<float>& values = grid_.Values();
+    const auto nx = static_cast<std::size_t>(geometry_.nx), ny = static_cast<std::size_t>(geometry_.ny);
+    const std::size_t i = cell % nx, j = cell / nx;
+    const auto rise = [&](std::size_t before, std::size_t behind, std::size_t steps) {
+      const float low = values[before], high = values[behind];
+      if (steps == 0 || grid_.IsEmptyValue(low) || grid_.IsEmptyValue(high)) return 0.0;
+      return static_cast<double>(high - low) / static_cast<double>(steps);
+    };
+    const std::size_t left = i > 0 ? 1 : 0, right = i + 1 < nx ? 1 : 0;
+    const std::size_t below = j > 0 ? 1 : 0, above = j + 1 < ny ? 1 : 0;
+    return {rise(cell - left, cell + right, left + right), rise(cell - below * nx, cell + above * nx, below + above)};
+  }
+
+  const CTvn2DOrthoRotatedGridData& grid_;
+  const GridGeometry geometry_;
+  MapPoint toLight_;
+  double stretch_ = 1;
+};
+
 }  // namespace
 
 std::shared_ptr<const GridPicture> GridPicture::Make(const GridLayer& layer, const DisplayUnits& units,
@@ -39,10 +93,19 @@ std::shared_ptr<const GridPicture> GridPicture::Make(const GridLayer& layer, con
   finest.colors.resize(picture->geometry_.CellCount());
   std::vector<std::size_t> cellsOfColor(MapPalette::kMostColors + 1);
   const std::vector<float>& values = layer.grid->Values();
+  std::optional<Hillshade> hillshade;
+  if (layer.isHillshaded && !layer.isCodes) {
+    hillshade.emplace(*layer.grid);
+    picture->palette_.MakeShades();
+  }
   for (std::size_t row = 0; row < static_cast<std::size_t>(finest.ny); ++row) {
     if (isGivenUp) return nullptr;
     for (std::size_t cell = row * rowLength; cell < (row + 1) * rowLength; ++cell)
-      ++cellsOfColor[finest.colors[cell] = picture->palette_.ColorNumber(values[cell])];
+    {
+      std::uint8_t color = picture->palette_.ColorNumber(values[cell]);
+      if (hillshade && color != 0) color = picture->palette_.Shaded(color, hillshade->ShadeOf(cell));
+      ++cellsOfColor[finest.colors[cell] = color];
+    }
   }
   picture->levels_.push_back(std::move(finest));
   constexpr int kCoarsest = 64;

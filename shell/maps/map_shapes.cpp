@@ -50,7 +50,12 @@ double DistanceTo(const Shape& shape, ShapeKind kind, MapPoint place) {
   return distance;
 }
 
-QString ValueText(const Shape& shape) { return shape.HasValue() ? ToQt(TextOf(shape.Value())) : QString(); }
+/// What a value is called on this layer.
+QString NameOf(const ShapeLayer& layer, const ShapeValue& value) {
+  const std::string text = TextOf(value);
+  const auto found = std::ranges::find(layer.names, text, &std::pair<std::string, std::string>::first);
+  return ToQt(found == layer.names.end() || found->second.empty() ? text : found->second);
+}
 
 }  // namespace
 
@@ -84,7 +89,7 @@ void ShapePicture::MakeColors() {
     QColor color = QColor(CodeColor(place));
     color.setAlpha(115);
     colors_.push_back(color);
-    const QString text = ToQt(TextOf(value));
+    const QString text = NameOf(layer_, value);
     legend_.Add(color, text.isEmpty() ? QCoreApplication::translate("ShapePicture", "no value") : text);
   }
   for (const Shape& shape : layer_.shapes->GetData()) colorOf_.push_back(places.at(valueOf(shape)));
@@ -186,7 +191,8 @@ void ShapePicture::DrawLabels(QPainter& painter, const DrawnMap& map, LabelPlace
     if (rooms_[i].width <= 0) continue;
     const QPointF middle = map.window.ToScreen(rooms_[i].middle);
     if (!map.part.contains(middle)) continue;
-    const QString text = ValueText(layer_.shapes->GetData()[i]);
+    const Shape& shape = layer_.shapes->GetData()[i];
+    const QString text = shape.HasValue() ? NameOf(layer_, shape.Value()) : QString();
     const QSizeF size = LabelSize(metrics, text);
     const double height = (around_[i]->yMax - around_[i]->yMin) / metres;
     if (!text.isEmpty() && size.width() < 0.9 * rooms_[i].width / metres && 1.5 * size.height() < height)

@@ -4,19 +4,49 @@
 
 #include <utility>
 
+#include "platform/item_types.h"
 #include "shell/maps/map_canvas.h"
 
 namespace tervane {
+
+namespace {
+
+constexpr const char* kHillshade = "Maps/Hillshade";
+
+}  // namespace
 
 MapView::MapView(Host& host, QWidget* parent) : PlotFrame(host, parent), canvas_(new MapCanvas) {
   connect(canvas_, &MapCanvas::PointedAt, this,
           [this](const QString& text) { SetStatus(text.isEmpty() ? canvas_->Summary() : text); });
   Hold({canvas_, [this](double factor) { canvas_->Zoom(factor); }, [this] { canvas_->Fit(); },
         [this](double pixelRatio) { return canvas_->Picture(pixelRatio); }});
+  hillshade_ = AddCommand(tr("&Hillshade"), [this] {
+    SetHillshade(hillshade_->isChecked());
+    Outside().SetSetting(kHillshade, hillshade_->isChecked() ? "1" : "0");
+  });
+  hillshade_->setCheckable(true);
+  hillshade_->setChecked(Outside().Setting(kHillshade) == "1");
+}
+
+void MapView::SetHillshade(bool isOn) {
+  MapContent content = canvas_->Content();
+  LightSlopes(content, isOn);
+  canvas_->SetContent(std::move(content), &units_);
+}
+
+void MapView::LightSlopes(MapContent& content, bool isOn) {
+  bool hasGround = false;
+  for (GridLayer& layer : content.grids) {
+    const bool isGround = !layer.isCodes && layer.grid->ItemType() == quantity::kElevation;
+    layer.isHillshaded = isGround && isOn;
+    hasGround = hasGround || isGround;
+  }
+  hillshade_->setVisible(hasGround);
 }
 
 void MapView::Show(MapContent content, const DisplayUnits* units) {
   const DisplayUnits chosen = units ? *units : DisplayUnits();
+  LightSlopes(content, hillshade_->isChecked());
   if (isShown_ && chosen == units_ && LooksSame(content, canvas_->Content())) {
     canvas_->SetPicked(std::move(content.picked));
     canvas_->Ask(std::move(content.request));

@@ -27,7 +27,12 @@ class MapView : public PlotFrame {
   MapCanvas& Canvas() const { return *canvas_; }
 
  private:
+  /// Lights the slopes of elevations, or no longer.
+  void SetHillshade(bool isOn);
+  void LightSlopes(MapContent& content, bool isOn);
+
   MapCanvas* canvas_;
+  QAction* hillshade_;
   DisplayUnits units_;
   bool isShown_ = false;
 };

@@ -57,18 +57,26 @@ void PlotFrame::Hold(Plot plot) {
     button->setAutoRaise(true);
     button->setToolTip(tip);
     button->setAccessibleName(tip);
-    connect(button, &QToolButton::clicked, this, std::move(command));
+    if (command) connect(button, &QToolButton::clicked, this, std::move(command));
     row_->addWidget(button);
     buttons_.emplace_back(button, icon);
   };
   add("insert", tr("Zoom in (+)"), [this] { plot_.zoom(kZoomStep); });
   add("zoom_out", tr("Zoom out (-)"), [this] { plot_.zoom(1 / kZoomStep); });
   add("fit", tr("Show everything (Home)"), [this] { plot_.fit(); });
+  // All that the context menu offers, where it is looked for.
+  add("more", tr("Copy, export and more"), {});
+  more_ = buttons_.back().first;
+  more_->setPopupMode(QToolButton::InstantPopup);
   column->addLayout(row_);
   plot_.widget->setContextMenuPolicy(Qt::ActionsContextMenu);
   AddCommand(tr("&Fit"), [this] { plot_.fit(); });
   AddCommand(tr("&Copy picture"), [this] { QApplication::clipboard()->setImage(plot_.picture(kPaperRatio)); });
-  AddCommand(tr("&Export as PNG..."), [this] { Export(); });
+  AddCommand(tr("&Export as PNG..."), [this] { ExportPicture(); });
+  if (plot_.values) {
+    AddCommand(tr("Copy &values"), [this] { QApplication::clipboard()->setText(plot_.values()); });
+    AddCommand(tr("Export va&lues..."), [this] { ExportValues(); });
+  }
   connect(&Theme::Get(), &Theme::Changed, this, &PlotFrame::FollowTheme);
   FollowTheme();
   panel_ = new WaitPanel(background_, *plot_.widget);
@@ -108,6 +116,7 @@ QAction* PlotFrame::AddCommand(const QString& text, std::function<void()> comman
   auto* action = new QAction(text, plot_.widget);
   connect(action, &QAction::triggered, this, std::move(command));
   plot_.widget->addAction(action);
+  more_->addAction(action);
   return action;
 }
 
@@ -134,13 +143,22 @@ void PlotFrame::ArrangeStatus() {
 
 void PlotFrame::resizeEvent(QResizeEvent* /*event*/) { ArrangeStatus(); }
 
-void PlotFrame::Export() {
-  const auto path = host_.AskFileToSave({FromQt(tr("Export as PNG")), "PNG picture (*.png)|*.png||", "png", {}});
-  if (!path) return;
+void PlotFrame::ExportPicture() {
   QByteArray bytes;
   QBuffer buffer(&bytes);
   buffer.open(QIODevice::WriteOnly);
   plot_.picture(kPaperRatio).save(&buffer, "PNG");
+  ExportAs(tr("Export as PNG"), "PNG picture (*.png)|*.png||", "png", bytes);
+}
+
+void PlotFrame::ExportValues() {
+  ExportAs(tr("Export values"), "Text with tabs (*.txt)|*.txt|All Files (*.*)|*.*||", "txt", plot_.values().toUtf8());
+}
+
+void PlotFrame::ExportAs(const QString& title, const std::string& filter, const std::string& extension,
+                         const QByteArray& bytes) {
+  const auto path = host_.AskFileToSave({FromQt(title), filter, extension, {}});
+  if (!path) return;
   const FileResult result =
       WriteFileAtomically(*path, std::string_view(bytes.constData(), static_cast<std::size_t>(bytes.size())));
   if (!result.Ok()) host_.ShowMessage(result.error, Host::Icon::Error);

@@ -32,6 +32,7 @@ class PlotFrame : public QWidget {
     std::function<void(double factor)> zoom;
     std::function<void()> fit;
     std::function<QImage(double pixelRatio)> picture;
+    std::function<QString()> values = {};  ///< As text, tabs between the columns; of plots that show values over time.
   };
 
   void SetStatus(const QString& text);
@@ -44,6 +45,7 @@ class PlotFrame : public QWidget {
  protected:
   PlotFrame(Host& host, QWidget* parent);
   void Hold(Plot plot);
+  Host& Outside() const { return host_; }
   /// A further control in front of the buttons.
   void AddToRow(QWidget* tool);
   /// A further command of the context menu.
@@ -63,7 +65,10 @@ class PlotFrame : public QWidget {
 
  private:
   bool IsThereInAMoment(const Awaited& awaited, const std::function<void()>& again);
-  void Export();
+  void ExportPicture();
+  void ExportValues();
+  /// Asks for a file and writes into it.
+  void ExportAs(const QString& title, const std::string& filter, const std::string& extension, const QByteArray& bytes);
   void FollowTheme();
   void ArrangeStatus();
 
@@ -76,6 +81,7 @@ class PlotFrame : public QWidget {
   QLabel* status_;
   QHBoxLayout* row_ = nullptr;  ///< The line below the plot.
   std::vector<std::pair<QToolButton*, QString>> buttons_;
+  QToolButton* more_ = nullptr;  ///< Its menu has the commands of the context menu.
 };
 
 }  // namespace tervane
