@@ -51,7 +51,7 @@ struct GridLayer {
   /// Smallest and largest value of all grids that are shown in turn, so that a colour means the same in each.
   std::optional<std::pair<float, float>> range = {};
   std::vector<std::pair<unsigned, std::string>> names = {};  ///< Of codes, for the legend; a code without one is told.
-  bool isHillshaded = false;  ///< Of elevations: slopes are lit from the north-west.
+  bool isHillshaded = false;                                 ///< Of elevations: slopes are lit from the north-west.
 
   bool operator==(const GridLayer&) const = default;
 };

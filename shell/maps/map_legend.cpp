@@ -120,8 +120,8 @@ void MapCanvas::DrawLegends(QPainter& painter, bool isScreen) {
     const double length = legendPlace_.height() / (legendMost_ + legendPlace_.height());
     QColor bar = Theme::Get().QuietColor();
     bar.setAlpha(140);
-    painter.fillRect(QRectF(legendPlace_.right() - Scaled(4),
-                            legendPlace_.top() + legendScroll_ * length, Scaled(4), legendPlace_.height() * length),
+    painter.fillRect(QRectF(legendPlace_.right() - Scaled(4), legendPlace_.top() + legendScroll_ * length, Scaled(4),
+                            legendPlace_.height() * length),
                      bar);
     return;
   }

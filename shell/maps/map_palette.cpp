@@ -20,7 +20,8 @@ namespace {
 constexpr std::array<QRgb, 7> kRamp{0xfff6e7a1, 0xffc3dc8c, 0xff83c795, 0xff48aca5, 0xff3388ad, 0xff3a62a8, 0xff4b3c8f};
 
 /// Of the ground, from valleys to peaks.
-constexpr std::array<QRgb, 7> kTerrain{0xff7fa868, 0xffaac37c, 0xffdccf96, 0xffc7a26b, 0xffa27a58, 0xff9b8b83, 0xfff1efec};
+constexpr std::array<QRgb, 7> kTerrain{0xff7fa868, 0xffaac37c, 0xffdccf96, 0xffc7a26b,
+                                       0xffa27a58, 0xff9b8b83, 0xfff1efec};
 
 /// Colours that are told apart side by side.
 constexpr std::array<QRgb, 20> kDistinct{0xff4e79a7, 0xfff28e2b, 0xff59a14f, 0xffe15759, 0xffb07aa1,

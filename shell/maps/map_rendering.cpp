@@ -100,8 +100,7 @@ std::shared_ptr<const GridPicture> GridPicture::Make(const GridLayer& layer, con
   }
   for (std::size_t row = 0; row < static_cast<std::size_t>(finest.ny); ++row) {
     if (isGivenUp) return nullptr;
-    for (std::size_t cell = row * rowLength; cell < (row + 1) * rowLength; ++cell)
-    {
+    for (std::size_t cell = row * rowLength; cell < (row + 1) * rowLength; ++cell) {
       std::uint8_t color = picture->palette_.ColorNumber(values[cell]);
       if (hillshade && color != 0) color = picture->palette_.Shaded(color, hillshade->ShadeOf(cell));
       ++cellsOfColor[finest.colors[cell] = color];

@@ -52,8 +52,8 @@ TEST(SeriesViews, AMonthHasTheMeanOfRatesAndTheSumOfAmounts) {
 
 TEST(SeriesViews, GapsReachFromValueToValue) {
   const Series series = Daily("mm", true, {kNothing, 1, kNothing, kNothing, 2, 3, kNothing, 4, kNothing});
-  EXPECT_THAT(GapsOf(series, 9), ElementsAre(std::pair(series.times[1], series.times[4]),
-                                             std::pair(series.times[5], series.times[7])));
+  EXPECT_THAT(GapsOf(series, 9),
+              ElementsAre(std::pair(series.times[1], series.times[4]), std::pair(series.times[5], series.times[7])));
   EXPECT_EQ(GapsOf(series, 1).size(), 1U);
 }
 

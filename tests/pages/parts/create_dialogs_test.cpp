@@ -87,9 +87,11 @@ TEST_F(CreateDialogs, ADomainIsFittedToAShapeFileThatIsTypedOrMade) {
   EXPECT_TRUE(page.Outside().IsDone());
   EXPECT_NE(page.Find("X0:").Text(), "0");
 
-  page.Outside().Expect("Take Grid from File", std::optional<std::string>(TERVANE_SOURCE_DIR "/examples/rhone/dem.tif"));
+  page.Outside().Expect("Take Grid from File",
+                        std::optional<std::string>(TERVANE_SOURCE_DIR "/examples/rhone/dem.tif"));
   page.Page().Press(page.Find("Take Grid from File..."));
-  EXPECT_EQ(page.Find("NX:").Text() + " " + page.Find("NY:").Text() + " " + page.Find("Cell Size:").Text(), "142 97 1000");
+  EXPECT_EQ(page.Find("NX:").Text() + " " + page.Find("NY:").Text() + " " + page.Find("Cell Size:").Text(),
+            "142 97 1000");
   EXPECT_THAT(page.Find("Map Projection Type:").Text(), HasSubstr("UTM zone 32N"));
   EXPECT_EQ(page.Changes().back(), "1 Take Grid from File");
 }
