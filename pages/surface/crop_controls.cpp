@@ -2,8 +2,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/surface/crop_controls.h"
 
-#include <algorithm>
-
 #include <fmt/format.h>
 
 #include "platform/text.h"
@@ -23,6 +21,15 @@ CYbDateTime DateOf(std::int64_t seconds) { return CYbDateTime::FromSecondsSinceE
 std::string NameOf(const Item& crop, int row) {
   const std::string name = crop.VegPropFile().VegetationName();
   return name.empty() ? fmt::format("crop {}", row) : name;
+}
+
+/// The vegetations of a library.
+std::vector<std::string> NamesIn(const FileName& file) {
+  std::vector<std::string> names;
+  if (file.IsEmpty()) return names;
+  for (const LibraryEntry& entry : ReadLibraryOnce(kVegetationLibrary, file.Absolute())->library.entries)
+    names.push_back(entry.Name());
+  return names;
 }
 
 TimeBar BarOf(const CropStretch& stretch) {
@@ -97,7 +104,8 @@ std::shared_ptr<TableOf<Item>> CropControls::CVegetationGrid() const {
           "Name", [](Item& crop) { return crop.VegPropFile().VegetationName(); },
           [](Item& crop, const std::string& name) { crop.VegPropFile().SetVegetationName(name); })
       .Width(85)
-      .Key("VEGETATION");
+      .Key("VEGETATION")
+      .Offers([](Item& crop) { return NamesIn(crop.VegPropFile().File); });
   table
       ->Value(
           "Start date", [](Item& crop) { return crop.StartDate; },
