@@ -69,17 +69,15 @@ void WriteFinding(const std::string& file, const SetupFinding& finding, std::ost
 }
 
 void WriteText(const std::string& file, const std::vector<SetupFinding>& findings, bool each, std::ostream& out) {
-  for (const FindingGroup& group : GroupsOf(findings)) {
-    if (!each && group.IsOfMany()) {
-      const SetupFinding& first = group.First();
-      fmt::print(out, "{}: {}: {}{}{}: {}: {} times{}\n", file, KindName(first.kind), OneLine(group.place),
-                 first.key.empty() ? "" : ":", first.key, OneLine(first.text), group.findings.size(),
-                 first.detail.empty() ? std::string()
-                 : group.isSameDetail ? fmt::format(" ({})", OneLine(first.detail))
-                                      : fmt::format(" (such as {})", OneLine(first.detail)));
+  // A few are better told one by one.
+  constexpr std::size_t kFewest = 4;
+  for (const FindingGroup& group : GroupFindings(findings)) {
+    if (!each && group.findings.size() >= kFewest) {
+      fmt::print(out, "{}: {}: {}: {}\n", file, KindName(group.First().kind), OneLine(group.Place()),
+                 OneLine(group.Text()));
       continue;
     }
-    for (const SetupFinding* finding : group.findings) WriteFinding(file, *finding, out);
+    for (const SetupFinding& finding : group.findings) WriteFinding(file, finding, out);
   }
   if (findings.empty()) fmt::print(out, "{}: no findings\n", file);
 }

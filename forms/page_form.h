@@ -66,7 +66,6 @@ enum class ControlKind {
   Group,     ///< A frame with a title around further controls.
   SubForms,  ///< A place at which one of several forms stands.
 };
-std::string_view KindName(ControlKind kind);
 /// A map, chart or section, which stands beside the form.
 constexpr bool IsPlot(ControlKind kind) {
   return kind == ControlKind::Map || kind == ControlKind::Chart || kind == ControlKind::Section;

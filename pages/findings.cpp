@@ -10,6 +10,7 @@
 
 #include "core/walked_node.h"
 #include "document/key_reference.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -89,51 +90,6 @@ std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document) {
   return found;
 }
 
-namespace {
-
-/// The path of all like places: items of a list and like sections differ in their number alone.
-std::string PlaceOfKind(const std::string& path) {
-  std::string place;
-  for (const PathStep& step : ParseSetupPath(path).steps) {
-    const std::size_t end = step.name.find_last_not_of("0123456789") + 1;
-    const bool isNumbered = end < step.name.size() || step.instance > 1;
-    place = JoinPath(place, isNumbered ? step.name.substr(0, end) + "*" : step.name);
-  }
-  return place;
-}
-
-}  // namespace
-
-std::vector<FindingGroup> GroupsOf(const std::vector<SetupFinding>& findings) {
-  constexpr std::size_t kFewest = 4;
-  std::vector<FindingGroup> groups;
-  std::unordered_map<std::string, std::size_t> places;
-  for (const SetupFinding& finding : findings) {
-    std::string place = PlaceOfKind(finding.path);
-    const std::string cause =
-        fmt::format("{}\n{}\n{}\n{}", static_cast<int>(finding.kind), place, finding.key, finding.text);
-    const auto [known, isNew] = places.try_emplace(cause, groups.size());
-    // What the file says of a line is told with that line.
-    if (isNew || finding.line > 0) {
-      groups.push_back({{&finding}, std::move(place)});
-      continue;
-    }
-    FindingGroup& group = groups[known->second];
-    group.isSameDetail = group.isSameDetail && group.First().detail == finding.detail;
-    group.findings.push_back(&finding);
-  }
-  std::vector<FindingGroup> result;
-  for (FindingGroup& group : groups) {
-    if (group.findings.size() >= kFewest || !group.IsOfMany()) {
-      if (!group.IsOfMany()) group.place = group.First().path;
-      result.push_back(std::move(group));
-      continue;
-    }
-    for (const SetupFinding* finding : group.findings) result.push_back({{finding}, finding->path});
-  }
-  return result;
-}
-
 SetupFinding FindingOf(const CYbSEDocument& document, const EngineMessage& message) {
   const SetupPath path = ParseSetupPath(message.place);
   CYbSEKvfBase* node = nullptr;
@@ -192,7 +148,7 @@ std::string FindingGroup::Place() const {
   const auto withKey = [&](const std::string& path) {
     return First().key.empty() ? path : fmt::format("{}:{}", path, First().key);
   };
-  return withKey(IsOne() ? First().path : NumberlessPath(First().path));
+  return withKey(IsOne() ? First().path : Replaced(NumberlessPath(First().path), "%d", "*"));
 }
 
 std::vector<FindingGroup> GroupFindings(std::vector<SetupFinding> findings) {

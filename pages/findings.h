@@ -38,19 +38,6 @@ inline bool NeedsAttention(const SetupFinding& finding) {
 /// What reading the file met, then the findings of the latest validation of all nodes, then what was not read.
 std::vector<SetupFinding> FindingsOf(const CYbSEDocument& document);
 
-/// Findings of one cause: they say the same of like places, such as the stations of one forcing.
-struct FindingGroup {
-  std::vector<const SetupFinding*> findings;  ///< In their order; a single one where nothing else says the same.
-  std::string place;                          ///< Their path, with `*` for what differs.
-  bool isSameDetail = true;
-
-  const SetupFinding& First() const { return *findings.front(); }
-  bool IsOfMany() const { return findings.size() > 1; }
-};
-/// All findings in groups, each where its first one stands. A few are better told one by one. The findings must outlive
-/// the groups.
-std::vector<FindingGroup> GroupsOf(const std::vector<SetupFinding>& findings);
-
 /// What an engine said of the setup. Where the setup has no such place, the text stands alone.
 SetupFinding FindingOf(const CYbSEDocument& document, const EngineMessage& message);
 /// Adds what an engine said; what it said of a key that has a finding joins that one. `whyPast` is empty, or tells why

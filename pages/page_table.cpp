@@ -29,12 +29,12 @@ struct PageFile {
   std::span<const PageRow> (*rows)();
 };
 constexpr PageFile kFiles[] = {
-    {"document", WholePages},
-    {"document", DocumentPages},  {"simspec", ComponentsPages}, {"simspec", ControlPages},
-    {"simspec", PeriodPages},     {"spatial", Data2DPages},     {"spatial", DomainPages},
-    {"spatial", StationPages},    {"spatial", ZonePages},       {"surface", ClimatePages},
-    {"surface", LandUsePages},    {"surface", VegetationPages}, {"surface", OverlandPages},
-    {"surface", IrrigationPages}, {"surface", RiverPages},      {"execution", ProcessedPages},
+    {"document", WholePages},      {"document", DocumentPages},  {"simspec", ComponentsPages},
+    {"simspec", ControlPages},     {"simspec", PeriodPages},     {"spatial", Data2DPages},
+    {"spatial", DomainPages},      {"spatial", StationPages},    {"spatial", ZonePages},
+    {"surface", ClimatePages},     {"surface", LandUsePages},    {"surface", VegetationPages},
+    {"surface", OverlandPages},    {"surface", IrrigationPages}, {"surface", RiverPages},
+    {"execution", ProcessedPages},
 };
 
 std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, PageContext context) {

@@ -17,12 +17,15 @@ void CIntroductionDlg::Describe(PageForm& form) {
 }
 
 void COverviewDlg::Initialize() {
-  Node().Lines = OverviewInWords(Context().document);
-  Node().Text = OverviewText(Node().Lines);
+  words_ = OverviewText(OverviewInWords(Context().document));
+  Node().Lines.clear();
+  Node().Text.clear();
+  if (Node().GetRoot() && GenerateOverview(*Node().GetRoot(), Node().Lines)) Node().Text = OverviewText(Node().Lines);
   PageOf::Initialize();
 }
 
 void COverviewDlg::Describe(PageForm& form) {
+  form.TextView("As the pages show it:", [this] { return words_; });
   form.TextView("", [this] { return Node().Text; });
 }
 

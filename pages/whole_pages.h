@@ -24,7 +24,7 @@ class CIntroductionDlg : public CTvnHelpView {
   SetupSummary summary_;
 };
 
-/// The whole setup as a text to read.
+/// The whole setup as a text to read, in the words of the pages and below by its keys.
 class COverviewDlg : public PageOf<COverviewKvf> {
  public:
   using PageOf::PageOf;
@@ -32,6 +32,9 @@ class COverviewDlg : public PageOf<COverviewKvf> {
 
  protected:
   void Describe(PageForm& form) override;
+
+ private:
+  std::string words_;
 };
 
 /// Pages that speak of what all other pages show: the first page and the overview. Help pages of other nodes are here

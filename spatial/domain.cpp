@@ -10,6 +10,7 @@
 #include "geometry/cart.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
+#include "platform/text.h"
 #include "platform/units.h"
 #include "spatial/pages.h"
 

@@ -48,9 +48,9 @@ struct AreaCells {
 FileResult CountCells(const CTvn2DOrthoRotatedGridData& domain, const GridSource& areas, ProgressPart progress,
                       AreaCells& cells);
 
-/// The cells of each area in the model domain of that node's tree, kept until what decides them changes. Null where they
-/// are not known: without a domain, for areas that cannot be read, and for a domain so large that counting would be
-/// waited for.
+/// The cells of each area in the model domain of that node's tree, kept until what decides them changes. Null where
+/// they are not known: without a domain, for areas that cannot be read, and for a domain so large that counting would
+/// be waited for.
 std::shared_ptr<const AreaCells> AreaCellsOf(const CYbSEKvfBase& node, const GridSource& areas);
 
 /// The same with the domain read first, and how large a cell is.

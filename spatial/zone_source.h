@@ -12,8 +12,8 @@
 
 #include "core/condition.h"
 #include "core/key_facts.h"
-#include "spatial/domain_cells.h"
 #include "spatial/data_use.h"
+#include "spatial/domain_cells.h"
 #include "spatial/file_nodes.h"
 #include "spatial/zone_sync.h"
 

@@ -132,10 +132,9 @@ CropDevelopment CVegetationListKvf::Development() const {
     development.problem = fmt::format("the calendar has {} crops, more than {}", calendar.entries.size(), kMostCrops);
     return development;
   }
-  return DevelopmentOf(
-      calendar.entries,
-      [&](const CTvnVegPropFile& file) -> const CTvnVegPropStageDataList& { return stages.Of(file); },
-      {start.SecondsSinceEpoch(), period->SIMEND.SecondsSinceEpoch()});
+  return DevelopmentOf(calendar.entries,
+                       [&](const CTvnVegPropFile& file) -> const CTvnVegPropStageDataList& { return stages.Of(file); },
+                       {start.SecondsSinceEpoch(), period->SIMEND.SecondsSinceEpoch()});
 }
 
 int CVegetationListKvf::ValidateData() {

@@ -73,7 +73,7 @@ void DescribeFile(PageForm& form, CPreprocessedDataEntity& n) {
 
 /// The button that opens the file of grids.
 void EditGridButton(PageForm& form, CPreprocessedDataEntity& n, const CYbSEDlgBase& page) {
-  form.Button("View", [&n, &page] { EditDataFile(page.Context(), n, FileName(n.GetFile(), {}), ItemOf(n)); })
+  form.Button("Edit...", [&n, &page] { EditDataFile(page.Context(), n, FileName(n.GetFile(), {}), ItemOf(n)); })
       .ToolTip("Use grid editor to view preprocessed grid data");
 }
 
@@ -104,7 +104,7 @@ SeriesContent SeriesChart(const CPreprocessedDataEntity& n) {
 /// A time series with the simulation period.
 void DescribeSeries(PageForm& form, CPreprocessedDataEntity& n, CYbSEDlgBase& page) {
   DescribeFile(form, n);
-  form.Button("View",
+  form.Button("Edit...",
               [&n, &page] {
                 if (const std::string file = n.GetFile(); !file.empty() && page.Context().openDataFile)
                   page.Context().openDataFile(file);

@@ -12,7 +12,7 @@ namespace tervane {
 void DescribeSeriesFile(PageForm& form, const CYbSEDlgBase& page, const std::string& label, CFMData0DFile& file,
                         FirstSeries first, const Condition& isShown) {
   form.DataFile(label, file).Filter(kSeriesFileFilter).DefaultExtension("nds0").ShownWhen(isShown);
-  form.Button("View",
+  form.Button("Edit...",
               [&file, &page] {
                 if (page.Context().openDataFile) page.Context().openDataFile(file.File.Absolute());
               })

@@ -117,7 +117,7 @@ void DescribeZoneSource(PageForm& form, const CYbSEDlgBase& page, ZoneSource& so
       .ShownWhen(byCodes)
       .Then(sync);
   Control& edit =
-      form.Button("View", [&page, &source] { EditDataFile(page.Context(), page.Node(), source.GridFile().File); })
+      form.Button("Edit...", [&page, &source] { EditDataFile(page.Context(), page.Node(), source.GridFile().File); })
           .ShownWhen(byCodes);
   if (words.isEditBeside) edit.Beside();
   form.Button("Create...",

@@ -86,7 +86,7 @@ void CData2DDlg::Describe(PageForm& form) {
           [&n](const std::string& name) { n.ShapeFile().Choose(n.ShapeFile().File, name); })
       .Of(n.ShapeFile(), "ITEM_NUMBERS")
       .ShownWhen(isShape);
-  form.Button("View", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(isGrid);
+  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(isGrid);
   form.Button("Create...",
               [this] {
                 CData2DKvf& node = Node();

@@ -87,7 +87,7 @@ void CCatchmentDlg::Describe(PageForm& form) {
       .DefaultExtension("nds2")
       .ShownWhen(fromGrid)
       .RevalidatesLater();
-  form.Button("View", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(fromGrid);
+  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(fromGrid);
   form.Button("Create...",
               [this] {
                 if (!MayCreateFile(Context())) return;

@@ -82,7 +82,7 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
       .Filter(kGridFileFilter)
       .DefaultExtension("nds2")
       .ShownWhen(is(Node_::kFullyDistributed));
-  form.Button("View", [this] { EditDataFile(Context(), Node(), Node().FullyDistributed().GridFile().File); })
+  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().FullyDistributed().GridFile().File); })
       .ShownWhen(is(Node_::kFullyDistributed));
   form.Map([this] {
         MapContent map = ForcingMap(Node(), nullptr);

@@ -17,7 +17,6 @@
 #include "shell/charts/chart_markers.h"
 #include "shell/charts/chart_panels.h"
 #include "shell/charts/chart_style.h"
-#include "shell/charts/dense_graph.h"
 #include "shell/charts/time_bars.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -237,8 +236,8 @@ void SeriesPlot::MarkMissing(int panel) {
     if (series.panel != panel || series.times.size() < 2) continue;
     const CYbDateTime first = series.times.front(), last = series.times.back();
     if (!first.IsValid() || !last.IsValid()) continue;
-    covered = covered ? std::pair(std::min(covered->first, first), std::max(covered->second, last))
-                      : std::pair(first, last);
+    covered =
+        covered ? std::pair(std::min(covered->first, first), std::max(covered->second, last)) : std::pair(first, last);
     for (const auto& [from, to] : GapsOf(series, kMostGaps)) add(from, to);
   }
   if (!covered || periods_.empty()) return;
@@ -248,7 +247,7 @@ void SeriesPlot::MarkMissing(int panel) {
 }
 
 void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) {
-  auto* graph = new DenseGraph(keys, values);
+  QCPGraph* graph = chart_->addGraph(keys, values);
   const auto shown = QSharedPointer<QCPGraphDataContainer>::create();
   QVector<QCPGraphData> points;
   const std::size_t count = std::min(PlaceCount(series), series.values.size());

@@ -196,7 +196,7 @@ TEST_F(CommandLine, FindingsOfOneCauseAreOneLineUnlessEachIsAskedFor) {
   const std::string place = "error: Climate/PrecipitationRate/TIME_SERIES_";
   const std::string grouped = Tervane({"check", file}).out;
   EXPECT_THAT(grouped,
-              HasSubstr(place + "*/TIME_SERIES_FILE:FILE_NAME: File is not valid: 5 times (no file is chosen)"));
+              HasSubstr(place + "*/TIME_SERIES_FILE:FILE_NAME: File is not valid (no file is chosen): 5 places"));
   EXPECT_THAT(grouped, Not(HasSubstr("TIME_SERIES_2")));
   EXPECT_THAT(Tervane({"check", file, "--each"}).out, HasSubstr(place + "2/TIME_SERIES_FILE:FILE_NAME: File is not"));
   EXPECT_GT(Json(Tervane({"check", file, "--json"}))["findings"].Size(), 5U);

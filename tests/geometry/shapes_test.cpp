@@ -177,14 +177,16 @@ TEST(Shapes, AreCheckedAgainstARequest) {
     const char* error;
   } rows[] = {
       {{}, "", ""},
-      {{false, false, true, Kind::Whole}, "code", ""},
-      {{false, false, true, Kind::Real}, "CODE", ""},
-      {{false, false, true, Kind::Real}, "AREA", ""},
-      {{true, true, false, {}}, "", "zones.shp: lines or points were expected, the file holds polygons"},
-      {{false, false, true, Kind::Whole}, "NAME", "attribute NAME is text, a whole number was expected"},
-      {{false, false, true, Kind::Whole}, "AREA", "attribute AREA is a real number, a whole number was expected"},
-      {{false, false, true, Kind::Whole}, "", "no attribute is selected"},
-      {{false, false, true, Kind::Whole}, "DEPTH", "has no attribute DEPTH; it has: CODE, NAME, AREA"},
+      {{false, false, true, false, Kind::Whole}, "code", ""},
+      {{false, false, true, false, Kind::Real}, "CODE", ""},
+      {{false, false, true, false, Kind::Real}, "AREA", ""},
+      {{true, true, false, false, {}}, "", "zones.shp: lines or points were expected, the file holds polygons"},
+      {{false, false, true, false, Kind::Whole}, "NAME", "attribute NAME is text, a whole number was expected"},
+      {{false, false, true, false, Kind::Whole},
+       "AREA",
+       "attribute AREA is a real number, a whole number was expected"},
+      {{false, false, true, false, Kind::Whole}, "", "no attribute is selected"},
+      {{false, false, true, false, Kind::Whole}, "DEPTH", "has no attribute DEPTH; it has: CODE, NAME, AREA"},
   };
   for (const auto& row : rows) {
     const FileResult result = CheckShapeFile(path, row.request, row.attribute);
@@ -207,7 +209,7 @@ TEST(Shapes, TellWhatTheyAreWithoutBeingKept) {
   folder.Write("zones.dbf", test::ReadFile(folder.File("zones.dbf")).replace(4, 1, "\x02"));
   EXPECT_THAT(ShapeFactsOf(path)->tableProblem, HasSubstr("3 shapes, but"));
   EXPECT_EQ(CheckShapeFile(path, {}, "").error, "");
-  EXPECT_THAT(CheckShapeFile(path, {false, false, true, Kind::Whole}, "CODE").error, HasSubstr("3 shapes, but"));
+  EXPECT_THAT(CheckShapeFile(path, {false, false, true, false, Kind::Whole}, "CODE").error, HasSubstr("3 shapes, but"));
   std::filesystem::remove(folder.File("zones.dbf"));
   EXPECT_THAT(ShapeFactsOf(path)->tableProblem, HasSubstr("zones.dbf does not exist"));
 

@@ -32,7 +32,7 @@ TEST(Summary, TellsWhatTheSetupIsAboutAndWhatComesNext) {
   EXPECT_EQ(Shown(document, "Model domain:"), "142 x 97 cells of 1000 m, WGS 84 / UTM zone 32N");
   EXPECT_THAT(Shown(document, "Switched on:"), HasSubstr("Overland Flow (OL): Finite Difference"));
   EXPECT_THAT(Shown(document, "Switched on:"), testing::Not(HasSubstr("Rivers")));
-  EXPECT_EQ(Shown(document, "Findings:"), "none");
+  EXPECT_EQ(Shown(document, "Findings:"), "1 warning");
   EXPECT_EQ(Shown(document, "Last run:"), "none yet");
   EXPECT_THAT(Shown(document, "Next step:"), HasSubstr("Run the preprocessor"));
 

@@ -150,8 +150,7 @@ TEST(DocumentFrame, ALongBranchBeginsClosedWithItsNumberAndStaysAsItWasLeft) {
   };
   ASSERT_TRUE(branch());
   EXPECT_FALSE(branch()->isExpanded());
-  EXPECT_TRUE(branch()->icon(0).isNull());
-  // What it hides is marked on it, and a finding inside opens it.
+  // The warning of the gauge without a cell is marked on it, and a finding inside opens it.
   setup.GoTo("Climate/PrecipitationRate/TIME_SERIES_7:FILE_NAME");
   EXPECT_TRUE(branch()->isExpanded());
   setup.Type("missing.nds0");

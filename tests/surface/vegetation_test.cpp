@@ -240,7 +240,7 @@ TEST_F(VegetationFiles, BothQuantitiesAreForcings) {
     return forcings.at(number);
   };
   vegetation.Global().FIXED_VALUE_RD = 0.5F;
-  EXPECT_EQ(only(1).series.at(0).constant, 0.5);
+  EXPECT_EQ(static_cast<double>(only(1).series.at(0).constant.value_or(0)), 0.5);
   vegetation.Global().TYPE = VegetationCourse::kCrops;
   AddCrop(crops, "Maize", {2000, 1, 11});
   const std::int64_t start = CYbDateTime(2000, 1, 11).SecondsSinceEpoch(),

@@ -65,7 +65,7 @@ class ZoneControls : public testing::Test {
 };
 
 TEST_F(ZoneControls, ShowWhatTheKindOfSourceHasAndItsStateAsksFor) {
-  const std::string codes = "Areas File: View Create... ",
+  const std::string codes = "Areas File: Edit... Create... ",
                     polygons = "Shape Distribution File: Item Name: Units of X- and Y-axises: ",
                     distribution = "Spatial Distribution: ", type = "Data Type: ";
   const struct {

@@ -70,7 +70,7 @@ TEST(OverlandPages, AShapeFileOfPondedAreasIsAskedForInWordsOfItsOwn) {
   page.Outside().Expect("Select shape file", std::optional<std::string>());
   page.Page().Browse(page.Find("Shape Distribution File:"));
   EXPECT_TRUE(page.Outside().IsDone());
-  EXPECT_FALSE(page.Find("View").IsShown());
+  EXPECT_FALSE(page.Find("Edit...").IsShown());
   // Both choices stay where the exchange is reduced everywhere, and no zone is made.
   page.Enter("Spatial Distribution:", "0");
   EXPECT_TRUE(page.Find("Data Type:").IsShown());

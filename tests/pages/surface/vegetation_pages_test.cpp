@@ -25,7 +25,7 @@ class VegetationPages : public testing::Test {
     std::vector<std::string> labels;
     page.Form().ForEach([&](const Control& control) {
       if (control.IsShown() && control.label != "Spatial Distribution:")
-        labels.push_back(control.label.empty() ? std::string(KindName(control.kind)) : control.label);
+        labels.push_back(control.label.empty() ? std::string(NameOf(control.kind)) : control.label);
     });
     return fmt::format("{}", fmt::join(labels, " | "));
   }

@@ -46,7 +46,7 @@ TEST(DataViewer, EditShowsTheFileInATabThatFollowsItAndClosesByItself) {
   topography->GridFile().Choose(FileName(path, {}));
   setup.GoTo("Topography");
   for (QPushButton* button : setup.Frame().findChildren<QPushButton*>())
-    if (button->isVisible() && button->text() == "View") button->click();
+    if (button->isVisible() && button->text() == "Edit...") button->click();
 
   auto* tabs = setup.Window().findChild<QTabWidget*>();
   auto* viewer = qobject_cast<DataViewer*>(tabs->currentWidget());
