@@ -21,7 +21,7 @@
 
 namespace tervane {
 
-constexpr int kTableWidth = 540;  ///< Of a table that is only shown, so that it can be read beside a map.
+constexpr int kTableWidth = 500;  ///< Of a table that is only shown, so that it can be read beside a map.
 
 TableView::TableView(CYbSEDlgBase& page, Control& control) : page_(page), control_(control) {
   auto* all = new QVBoxLayout(this);

@@ -35,6 +35,8 @@ void OfferTexts(QLineEdit& edit, std::function<QStringList()> texts, std::functi
   QObject::connect(all, &QAction::triggered, completer, showAll);
   auto* key = new QShortcut(QKeySequence(Qt::ALT | Qt::Key_Down), &edit, nullptr, nullptr, Qt::WidgetShortcut);
   QObject::connect(key, &QShortcut::activated, completer, showAll);
+  // The first letter is to find something already.
+  ask();
   QObject::connect(completer, qOverload<const QString&>(&QCompleter::activated), &edit,
                    [&edit, chosen = std::move(chosen)](const QString& text) {
                      edit.setText(text);

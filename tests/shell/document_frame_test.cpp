@@ -160,6 +160,7 @@ TEST(DocumentFrame, ALongBranchBeginsClosedWithItsNumberAndStaysAsItWasLeft) {
   EXPECT_FALSE(branch()->icon(0).isNull());
   branch()->setExpanded(true);
   setup.Command("Zoom In");
+  QApplication::processEvents();  // The panes are made anew, and shown with the next events.
   EXPECT_TRUE(branch()->isExpanded());
   setup.Command("Actual Size");
   const test::NextAnswer discard("Discard");

@@ -250,7 +250,12 @@ TEST(DocumentRun, LeadsFromAChangedFileToTheProcessedPages) {
   OpenedSetup setup(test::Example{"rhone", "rhone.tvd"});
   setup.Program().Settings().setValue(kEnginePathSetting, ToQt(std::string(TERVANE_BIN_DIR) + "/engines"));
   WriteShortSeries(setup.Folder().File("january.nds0"));
-  const auto findings = [&] { return FindingsOf(setup.Session().Document()); };
+  const auto findings = [&] {
+    std::vector<SetupFinding> found = FindingsOf(setup.Session().Document());
+    // The gauge whose area is smaller than a cell stays as it is.
+    std::erase_if(found, [](const SetupFinding& finding) { return finding.key == "GRIDCODEID"; });
+    return found;
+  };
   ASSERT_THAT(findings(), IsEmpty());
 
   const std::string station = "Climate/PrecipitationRate/TIME_SERIES_7";
@@ -260,7 +265,7 @@ TEST(DocumentRun, LeadsFromAChangedFileToTheProcessedPages) {
   ASSERT_EQ(findings().size(), 1U);
   EXPECT_EQ(findings()[0].path, station + "/TIME_SERIES_FILE");
   EXPECT_THAT(findings()[0].detail, HasSubstr("the simulation runs to 2015-12-31"));
-  EXPECT_EQ(setup.Frame().findChild<FindingsView*>()->topLevelItemCount(), 1);
+  EXPECT_EQ(setup.Frame().findChild<FindingsView*>()->topLevelItemCount(), 2) << "with the gauge";
 
   // The engine refuses what the editor warns of, and its message leads to the same control.
   const auto run = [&] {
