@@ -156,6 +156,7 @@ void SeriesPlot::Build() {
   const bool hasBars = !content_.IsEmpty() && !content_.numbers && !content_.bars.empty();
   panels_->SetUp(panels, hasBars, content_.numbers);
   if (hasBars) BuildStrip();
+  chart_->setMinimumHeight(Theme::Get().Scaled(hasBars ? 260 : 140));
   for (int panel = 0; panel < panels; ++panel) BuildPanel(panel);
   message_->setText(content_.message.empty() ? tr("There is nothing to show.") : Translated(content_.message));
   message_->setVisible(content_.IsEmpty());
