@@ -301,10 +301,11 @@ TEST(TableView, ADateIsChosenInTheCalendarOfItsCell) {
 TEST(TableView, ATextOffersWhatItsRowKnowsAndTakesAnyOther) {
   ShownTable table;
   const auto open = [&](int row) {
-    QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
     table.GoTo(row, kName);
     table.Press(Qt::Key_F2);
-    return table.Cells().findChild<QLineEdit*>();
+    // One that was closed may still be there.
+    const auto editors = table.Cells().findChildren<QLineEdit*>();
+    return editors.isEmpty() ? nullptr : editors.last();
   };
   QLineEdit* edit = open(2);
   ASSERT_TRUE(edit && edit->completer());
@@ -316,7 +317,9 @@ TEST(TableView, ATextOffersWhatItsRowKnowsAndTakesAnyOther) {
   EXPECT_EQ(table.Row(2).name, "Winter");
   edit = open(2);
   edit->selectAll();
-  table.Type("alfred");
+  table.Type("alf");
+  EXPECT_EQ(edit->completer()->completionCount(), 1) << "those that hold what is typed";
+  table.Type("red");
   table.Press(Qt::Key_Return);
   EXPECT_EQ(table.Row(2).name, "alfred");
 }
