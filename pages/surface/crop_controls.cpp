@@ -157,9 +157,11 @@ void CropControls::AskStart() {
   Item* crop = table_->Current();
   if (!crop) return;
   question_.AskDate(fmt::format("Click the start of {}.", NameOf(*crop, table_->CurrentRow())),
-                    [this, crop](const CYbDateTime& date) {
+                    [this, serial = crop->Serial()](const CYbDateTime& date) {
                       // It may have been deleted meanwhile.
-                      if (crops_.GetNumberWhatIs(crop) > 0) MoveStart(*crop, date);
+                      for (int number = 1; number <= crops_.GetItemCount(); ++number)
+                        if (Item& asked = *crops_.GetItem(number); asked.Serial() == serial)
+                          return MoveStart(asked, date);
                     });
 }
 
