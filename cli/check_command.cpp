@@ -97,16 +97,16 @@ int CheckCommand(const std::string& file, bool json, bool each, Streams streams)
 
 void OfferCheckCommand(CommandOffers& offers) {
   auto options = std::make_shared<CheckOptions>();
-  CLI::App* check = offers.Command(
+  Command check = offers.Offer(
       "check", "List errors, warnings, notes and what the file holds that nothing reads", [offers, options] {
         return options->coverage ? CoverageCommand(options->file, options->json, offers.Output())
                                  : CheckCommand(options->file, options->json, options->each, offers.Output());
       });
   AddSetup(check, options->file);
-  check->add_flag("--json", options->json, "As JSON");
-  check->add_flag("--each", options->each, "Each finding on a line, also where many have one cause");
-  check->add_flag("--coverage", options->coverage,
-                  "Instead, how the data cover simulation and domain, and what the forcings come to each year");
+  check.AddFlag("--json", options->json, "As JSON");
+  check.AddFlag("--each", options->each, "Each finding on a line, also where many have one cause");
+  check.AddFlag("--coverage", options->coverage,
+                "Instead, how the data cover simulation and domain, and what the forcings come to each year");
 }
 
 }  // namespace tervane

@@ -5,8 +5,10 @@
 #include <new>
 #include <span>
 #include <string>
+#include <utility>
 #include <vector>
 
+#include <CLI/CLI.hpp>
 #include <fmt/format.h>
 
 #include "cli/offers.h"
@@ -20,7 +22,7 @@ namespace tervane {
 namespace {
 
 void OfferImports(CommandOffers& offers) {
-  CLI::App* family = offers.Family("import", "Make data files of other files");
+  const Command family = offers.Family("import", "Make data files of other files");
   OfferSeriesImport(offers, family);
   OfferGridImport(offers, family);
   OfferRiverImport(offers, family);
@@ -66,18 +68,28 @@ std::string WhyNoCommand(const CLI::App& app, std::span<const std::string> words
 
 }  // namespace
 
-CLI::Option* AddQuantity(CLI::App* command, int& itemType) {
-  return command->add_option_function<std::string>(
-      "--item",
-      [&itemType](const std::string& typed) {
-        const ItemType* type = FindItemType(typed);
-        if (!type)
-          throw CLI::ValidationError(
-              "--item",
-              fmt::format("there is no item type {}: a code or a name was expected, {}", typed, NearQuantities(typed)));
-        itemType = type->code;
-      },
-      "The quantity, by its code or name: 100431, \"Precipitation Rate\"");
+Command CommandOffers::Offer(const char* name, const char* description, std::function<int()> run,
+                             const Command* family) {
+  CLI::App* command = (family ? family->app_ : &app_)->add_subcommand(name, description);
+  command->callback([&status = status_, run = std::move(run)] { status = run(); });
+  return Command(command);
+}
+
+Command CommandOffers::Family(const char* name, const char* description) {
+  CLI::App* family = app_.add_subcommand(name, description);
+  family->require_subcommand(1);
+  return Command(family);
+}
+
+CommandOption AddQuantity(Command& command, int& itemType) {
+  const auto take = [&itemType](const std::string& typed) {
+    const ItemType* type = FindItemType(typed);
+    if (!type)
+      return fmt::format("there is no item type {}: a code or a name was expected, {}", typed, NearQuantities(typed));
+    itemType = type->code;
+    return std::string();
+  };
+  return command.AddTaken("--item", take, "The quantity, by its code or name: 100431, \"Precipitation Rate\"");
 }
 
 int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& plainOut, std::ostream& plainErr) {

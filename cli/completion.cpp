@@ -1,5 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <CLI/CLI.hpp>
 #include <fmt/format.h>
 
 #include "cli/offers.h"
@@ -80,7 +81,7 @@ complete -o filenames -F _tervane tervane
 }  // namespace
 
 void OfferCompletion(CommandOffers& offers) {
-  offers.Command("completion", "Print the completion script for bash; use: source <(tervane completion)", [offers] {
+  offers.Offer("completion", "Print the completion script for bash; use: source <(tervane completion)", [offers] {
     offers.Output().out << BashCompletion(offers.Whole());
     return kDone;
   });

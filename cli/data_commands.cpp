@@ -300,18 +300,18 @@ void OfferDataCommands(CommandOffers& offers) {
     bool json = false;
   };
   auto options = std::make_shared<Options>();
-  CLI::App* data = offers.Family(
+  const Command data = offers.Family(
       "data",
       "Look into data files (.nds0 to .nds3, netCDF), rasters (GeoTIFF, ...), libraries (.etv) and river networks");
-  CLI::App* info = offers.Command(
+  Command info = offers.Offer(
       "info", "Tell items, times and place",
-      [offers, options] { return DataInfoCommand(options->file, options->json, offers.Output()); }, data);
-  CLI::App* stats = offers.Command(
+      [offers, options] { return DataInfoCommand(options->file, options->json, offers.Output()); }, &data);
+  Command stats = offers.Offer(
       "stats", "Tell range, mean and missing values of each item",
-      [offers, options] { return DataStatsCommand(options->file, options->json, offers.Output()); }, data);
-  for (CLI::App* command : {info, stats}) {
-    command->add_option("FILE", options->file, "The data file")->required();
-    command->add_flag("--json", options->json, "As JSON");
+      [offers, options] { return DataStatsCommand(options->file, options->json, offers.Output()); }, &data);
+  for (Command* command : {&info, &stats}) {
+    command->Add("FILE", options->file, "The data file").Required();
+    command->AddFlag("--json", options->json, "As JSON");
   }
 }
 

@@ -88,12 +88,12 @@ void OfferDiffCommand(CommandOffers& offers) {
     bool json = false;
   };
   auto options = std::make_shared<Options>();
-  CLI::App* diff = offers.Command("diff", "Compare two setups by section and key", [offers, options] {
+  Command diff = offers.Offer("diff", "Compare two setups by section and key", [offers, options] {
     return DiffCommand(options->from, options->to, options->json, offers.Output());
   });
-  diff->add_option("A", options->from, "The old setup")->required();
-  diff->add_option("B", options->to, "The new setup")->required();
-  diff->add_flag("--json", options->json, "As JSON");
+  diff.Add("A", options->from, "The old setup").Required();
+  diff.Add("B", options->to, "The new setup").Required();
+  diff.AddFlag("--json", options->json, "As JSON");
 }
 
 }  // namespace tervane

@@ -1,7 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <algorithm>
-#include <map>
 #include <new>
 #include <optional>
 #include <vector>
@@ -23,9 +22,8 @@ namespace {
 /// What of a data file is written for other programs.
 struct Export {
   std::string in, out;
-  int item = 1, step = 1, layer = 1;  ///< Of grids.
-  bool isPartNamed = false;           ///< One of them was given.
-  std::optional<CsvStamps> stamps;    ///< Of series; ends without it.
+  std::optional<int> item, step, layer;  ///< Of grids; each the first without it.
+  std::optional<CsvStamps> stamps;       ///< Of series; ends without it.
   bool force = false;
 };
 
@@ -51,14 +49,14 @@ std::string StampsText(const DataFile& file, const Export& wanted) {
 /// Writes one step of one layer, in the file's unit.
 FileResult WriteRaster(const DataFile& file, const Export& wanted) {
   const std::size_t count = file.Items().size();
-  if (static_cast<std::size_t>(wanted.item) > count)
-    return Failed(fmt::format("{}: there is no item {}: the file has {}", wanted.in, wanted.item, count));
-  const DataItem& item = file.Items()[static_cast<std::size_t>(wanted.item - 1)];
-  if (item.dimensions < 2) return Failed(fmt::format("{}: item {} is no grid", wanted.in, wanted.item));
   ValueSelection selection;
-  selection.item = wanted.item;
-  selection.step = static_cast<std::size_t>(wanted.step - 1);
-  selection.layer = wanted.layer - 1;
+  selection.item = wanted.item.value_or(1);
+  selection.step = static_cast<std::size_t>(wanted.step.value_or(1) - 1);
+  selection.layer = wanted.layer.value_or(1) - 1;
+  if (static_cast<std::size_t>(selection.item) > count)
+    return Failed(fmt::format("{}: there is no item {}: the file has {}", wanted.in, selection.item, count));
+  const DataItem& item = file.Items()[static_cast<std::size_t>(selection.item - 1)];
+  if (item.dimensions < 2) return Failed(fmt::format("{}: item {} is no grid", wanted.in, selection.item));
   std::vector<float> values(file.SizeOf(selection));
   if (std::string error = file.Read(selection, values); !error.empty()) return Failed(std::move(error));
   return WriteGeoTiff(wanted.out, {item.geometry, item.name, item.itemType, item.unitKey, item.unitText}, values);
@@ -69,7 +67,7 @@ int ExportCommand(const Export& wanted, Streams streams) {
   if (const std::string error = file.Open(wanted.in); !error.empty()) return Refuse(streams, error);
   const std::string_view extension = ExtensionOf(wanted.out);
   const bool isRaster = EqualIgnoringCase(extension, ".tif") || EqualIgnoringCase(extension, ".tiff");
-  if (!isRaster && wanted.isPartNamed)
+  if (!isRaster && (wanted.item || wanted.step || wanted.layer))
     return Refuse(streams, "--item, --step and --layer choose a grid for a GeoTIFF: give OUT the extension .tif");
   if (isRaster && wanted.stamps)
     return Refuse(streams, "--stamps tells what the dates of a table are: a GeoTIFF has none");
@@ -90,23 +88,16 @@ int ExportCommand(const Export& wanted, Streams streams) {
 
 void OfferExportCommand(CommandOffers& offers) {
   auto options = std::make_shared<Export>();
-  CLI::App* exporting = offers.Command("export", "Write time series (.nds0) as a table (CSV), or a grid as GeoTIFF",
-                                       [offers, options] { return ExportCommand(*options, offers.Output()); });
-  exporting->add_option("FILE", options->in, "The data file")->required();
-  exporting->add_option("OUT", options->out, "The file to write: a GeoTIFF when it ends in .tif, else a table")
-      ->required();
-  for (const auto& [name, number, description] :
-       {std::tuple{"--item", &options->item, "The item of a grid, from 1; the first without it"},
-        std::tuple{"--step", &options->step, "Its time step, from 1; the first without it"},
-        std::tuple{"--layer", &options->layer, "Its layer, from 1 at the bottom; the lowest without it"}}) {
-    exporting->add_option(name, *number, description)->check(CLI::PositiveNumber)->each([options](const std::string&) {
-      options->isPartNamed = true;
-    });
-  }
-  const std::map<std::string, CsvStamps> places{{"begin", CsvStamps::Begins}, {"end", CsvStamps::Ends}};
-  exporting->add_option("--stamps", options->stamps, "Which end of its interval a date of a table is; end without it")
-      ->transform(CLI::CheckedTransformer(places));
-  exporting->add_flag("--force", options->force, "Replace a file that exists");
+  Command exporting = offers.Offer("export", "Write time series (.nds0) as a table (CSV), or a grid as GeoTIFF",
+                                   [offers, options] { return ExportCommand(*options, offers.Output()); });
+  exporting.Add("FILE", options->in, "The data file").Required();
+  exporting.Add("OUT", options->out, "The file to write: a GeoTIFF when it ends in .tif, else a table").Required();
+  exporting.Add("--item", options->item, "The item of a grid, from 1; the first without it").Positive();
+  exporting.Add("--step", options->step, "Its time step, from 1; the first without it").Positive();
+  exporting.Add("--layer", options->layer, "Its layer, from 1 at the bottom; the lowest without it").Positive();
+  exporting.AddChoice<CsvStamps>("--stamps", options->stamps, {{"begin", CsvStamps::Begins}, {"end", CsvStamps::Ends}},
+                                 "Which end of its interval a date of a table is; end without it");
+  exporting.AddFlag("--force", options->force, "Replace a file that exists");
 }
 
 }  // namespace tervane

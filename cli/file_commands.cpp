@@ -78,23 +78,22 @@ int ConvertCommand(const std::string& in, const std::string& out, bool force, St
 
 void OfferFileCommands(CommandOffers& offers) {
   auto options = std::make_shared<FileOptions>();
-  CLI::App* create = offers.Command("new", "Write a setup with all defaults", [offers, options] {
+  Command create = offers.Offer("new", "Write a setup with all defaults", [offers, options] {
     return NewCommand(options->file, options->force, offers.Output());
   });
   AddSetup(create, options->file);
-  create->add_flag("--force", options->force,
-                   "Replace a file that exists, also where an editor has it open; write under a name without .tvd");
+  create.AddFlag("--force", options->force,
+                 "Replace a file that exists, also where an editor has it open; write under a name without .tvd");
 }
 
 void OfferConvertCommand(CommandOffers& offers) {
   auto options = std::make_shared<FileOptions>();
-  CLI::App* convert = offers.Command(
+  Command convert = offers.Offer(
       "convert", "Write a setup of any version as one of the present version",
       [offers, options] { return ConvertCommand(options->in, options->file, options->force, offers.Output()); });
-  convert->add_option("IN", options->in, "The setup to read")->required();
-  convert->add_option("OUT", options->file, "The setup to write; when it is IN, the original is kept beside it")
-      ->required();
-  convert->add_flag("--force", options->force, "Replace another file that exists, also where an editor has it open");
+  convert.Add("IN", options->in, "The setup to read").Required();
+  convert.Add("OUT", options->file, "The setup to write; when it is IN, the original is kept beside it").Required();
+  convert.AddFlag("--force", options->force, "Replace another file that exists, also where an editor has it open");
 }
 
 }  // namespace tervane

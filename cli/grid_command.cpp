@@ -84,12 +84,12 @@ int ImportGridCommand(const GridImport& import, Streams streams) {
 
 }  // namespace
 
-void OfferGridImport(CommandOffers& offers, CLI::App* family) {
+void OfferGridImport(CommandOffers& offers, const Command& family) {
   auto options = std::make_shared<GridImport>();
-  CLI::App* gridding = offers.Command(
+  Command gridding = offers.Offer(
       "grid", "Make a grid (.nds2) of a band of a raster (GeoTIFF, ASCII grid, ...)",
-      [offers, options] { return ImportGridCommand(*options, offers.Output()); }, family);
-  gridding->footer(
+      [offers, options] { return ImportGridCommand(*options, offers.Output()); }, &family);
+  gridding.Footer(
       "UNITS. The values are in the unit of --unit, without it in the one that the raster names, without that in the\n"
       "item type's base unit. A unit that the item type has is kept with the values as they are; values in any other\n"
       "unit (feet for an elevation, say) are converted to the base unit.\n"
@@ -97,19 +97,20 @@ void OfferGridImport(CommandOffers& offers, CLI::App* family) {
       "cells agree; codes (item type 100370, or 999 with whole numbers of at most 100 values) from the nearest cell;\n"
       "else the average of the raster's cells in it, where two or more go across, or the bilinear value between them.\n"
       "Where both projections are known and differ, places are converted.");
-  gridding->add_option("RASTER", options->in, "The raster, of any kind that GDAL reads")->required();
-  gridding->add_option("OUT", options->out, "The data file to write")->required();
-  AddQuantity(gridding, options->itemType)->required();
-  gridding->add_option("--unit", options->unit, "The unit of the raster's values; see UNITS");
-  gridding->add_option("--band", options->band, "The number of the band, from 1; not needed where there is only one")
-      ->check(CLI::PositiveNumber);
-  gridding->add_option("--like", options->like, "A setup (.tvd), on whose model grid the values are put; see PLACE");
-  const std::map<std::string, Resampling> methods{
-      {"nearest", Resampling::Nearest}, {"bilinear", Resampling::Bilinear}, {"average", Resampling::Average}};
-  gridding->add_option("--resample", options->resampling, "How, with --like, instead of what PLACE tells")
-      ->transform(CLI::CheckedTransformer(methods))
-      ->needs("--like");
-  gridding->add_flag("--force", options->force, "Replace a file that exists");
+  gridding.Add("RASTER", options->in, "The raster, of any kind that GDAL reads").Required();
+  gridding.Add("OUT", options->out, "The data file to write").Required();
+  AddQuantity(gridding, options->itemType).Required();
+  gridding.Add("--unit", options->unit, "The unit of the raster's values; see UNITS");
+  gridding.Add("--band", options->band, "The number of the band, from 1; not needed where there is only one")
+      .Positive();
+  gridding.Add("--like", options->like, "A setup (.tvd), on whose model grid the values are put; see PLACE");
+  gridding
+      .AddChoice<Resampling>(
+          "--resample", options->resampling,
+          {{"nearest", Resampling::Nearest}, {"bilinear", Resampling::Bilinear}, {"average", Resampling::Average}},
+          "How, with --like, instead of what PLACE tells")
+      .Needs("--like");
+  gridding.AddFlag("--force", options->force, "Replace a file that exists");
 }
 
 }  // namespace tervane

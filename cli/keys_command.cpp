@@ -105,10 +105,10 @@ int KeysCommand(const KeysOptions& options, Streams streams) {
 
 void OfferKeysCommand(CommandOffers& offers) {
   auto options = std::make_shared<KeysOptions>();
-  CLI::App* keys = offers.Command("keys", "List all keys with place, type, default and values",
-                                  [offers, options] { return KeysCommand(*options, offers.Output()); });
-  CLI::Option* markdown = keys->add_flag("--markdown", options->markdown, "As a page of the manual");
-  keys->add_flag("--json", options->json, "As JSON")->excludes(markdown);
+  Command keys = offers.Offer("keys", "List all keys with place, type, default and values",
+                              [offers, options] { return KeysCommand(*options, offers.Output()); });
+  CommandOption markdown = keys.AddFlag("--markdown", options->markdown, "As a page of the manual");
+  keys.AddFlag("--json", options->json, "As JSON").Excludes(markdown);
 }
 
 }  // namespace tervane

@@ -8,8 +8,7 @@
 #include <memory>
 #include <string>
 
-#include <CLI/CLI.hpp>
-
+#include "cli/command.h"
 #include "cli/command_line.h"
 #include "cli/commands.h"
 
@@ -25,18 +24,10 @@ class CommandOffers {
   /// The whole, for the completion.
   const CLI::App& Whole() const { return app_; }
 
-  /// A command, or with `parent` one of several under its name; `run` gives an `ExitStatus`.
-  CLI::App* Command(const char* name, const char* description, std::function<int()> run, CLI::App* parent = nullptr) {
-    CLI::App* command = (parent ? parent : &app_)->add_subcommand(name, description);
-    command->callback([&status = status_, run = std::move(run)] { status = run(); });
-    return command;
-  }
+  /// A command, or with `family` one of several under its name; `run` gives an `ExitStatus`.
+  Command Offer(const char* name, const char* description, std::function<int()> run, const Command* family = nullptr);
   /// A name under which several commands stand.
-  CLI::App* Family(const char* name, const char* description) {
-    CLI::App* family = app_.add_subcommand(name, description);
-    family->require_subcommand(1);
-    return family;
-  }
+  Command Family(const char* name, const char* description);
 
  private:
   CLI::App& app_;
@@ -46,11 +37,9 @@ class CommandOffers {
 
 // Options that several commands have, told once.
 
-inline void AddSetup(CLI::App* command, std::string& file) {
-  command->add_option("FILE", file, "The setup (.tvd)")->required();
-}
+inline void AddSetup(Command& command, std::string& file) { command.Add("FILE", file, "The setup (.tvd)").Required(); }
 /// A quantity by its code or its name, in any case; an unknown one is refused with those that come near.
-CLI::Option* AddQuantity(CLI::App* command, int& itemType);
+CommandOption AddQuantity(Command& command, int& itemType);
 
 // The files of commands, in the order of the help.
 
@@ -66,9 +55,9 @@ void OfferKeysCommand(CommandOffers& offers);
 void OfferRunCommand(CommandOffers& offers);
 void OfferDataCommands(CommandOffers& offers);
 /// Below the family `import`.
-void OfferSeriesImport(CommandOffers& offers, CLI::App* family);
-void OfferGridImport(CommandOffers& offers, CLI::App* family);
-void OfferRiverImport(CommandOffers& offers, CLI::App* family);
+void OfferSeriesImport(CommandOffers& offers, const Command& family);
+void OfferGridImport(CommandOffers& offers, const Command& family);
+void OfferRiverImport(CommandOffers& offers, const Command& family);
 void OfferExportCommand(CommandOffers& offers);
 void OfferCompletion(CommandOffers& offers);
 

@@ -86,12 +86,12 @@ void OfferPageCommand(CommandOffers& offers) {
     bool json = false;
   };
   auto options = std::make_shared<Options>();
-  CLI::App* page = offers.Command("page", "Show the page of a node as text, control by control", [offers, options] {
+  Command page = offers.Offer("page", "Show the page of a node as text, control by control", [offers, options] {
     return PageCommand(options->file, options->path, options->json, offers.Output());
   });
   AddSetup(page, options->file);
-  page->add_option("PATH", options->path, "The node")->required();
-  page->add_flag("--json", options->json, "As JSON");
+  page.Add("PATH", options->path, "The node").Required();
+  page.AddFlag("--json", options->json, "As JSON");
 }
 
 }  // namespace tervane

@@ -151,21 +151,19 @@ int PrintRiver(const std::string& path, bool json, Streams streams) {
   return reading->findings.empty() ? kDone : kFindings;
 }
 
-void OfferRiverImport(CommandOffers& offers, CLI::App* family) {
+void OfferRiverImport(CommandOffers& offers, const Command& family) {
   auto options = std::make_shared<RiverImportCommand>();
-  CLI::App* river = offers.Command(
+  Command river = offers.Offer(
       "river", "Make a river network (.fvnwk) of the lines of a shape file",
-      [offers, options] { return ImportRiver(*options, offers.Output()); }, family);
-  river->add_option("LINES", options->in, "The shape file (.shp)")->required();
-  river->add_option("OUT", options->out, "The network (.fvnwk)")->required();
-  river->add_option("--name", options->name, "The attribute with the names of the branches; NAME, if there is one");
-  river->add_option("--ground", options->ground, "A grid of elevations (.nds2): branches flow downhill");
-  river->add_option("--item", options->item, "The item of the grid; the first");
-  river->add_option("--tolerance", options->tolerance, "Ends within this distance are joined, in metres; 1")
-      ->check(CLI::NonNegativeNumber);
-  river->add_option("--sliver", options->sliver, "Shorter lines are told, in metres; 100")
-      ->check(CLI::NonNegativeNumber);
-  river->add_flag("--force", options->force, "Take the place of the branches of a network that is there");
+      [offers, options] { return ImportRiver(*options, offers.Output()); }, &family);
+  river.Add("LINES", options->in, "The shape file (.shp)").Required();
+  river.Add("OUT", options->out, "The network (.fvnwk)").Required();
+  river.Add("--name", options->name, "The attribute with the names of the branches; NAME, if there is one");
+  river.Add("--ground", options->ground, "A grid of elevations (.nds2): branches flow downhill");
+  river.Add("--item", options->item, "The item of the grid; the first");
+  river.Add("--tolerance", options->tolerance, "Ends within this distance are joined, in metres; 1").NotNegative();
+  river.Add("--sliver", options->sliver, "Shorter lines are told, in metres; 100").NotNegative();
+  river.AddFlag("--force", options->force, "Take the place of the branches of a network that is there");
 }
 
 }  // namespace tervane

@@ -153,23 +153,23 @@ int RunCommand(const RunOptions& options, Streams streams) {
 
 void OfferRunCommand(CommandOffers& offers) {
   auto options = std::make_shared<RunOptions>();
-  CLI::App* runs = offers.Command("run", "Run a setup with its engine and wait for the end",
-                                  [offers, options] { return RunCommand(*options, offers.Output()); });
+  Command runs = offers.Offer("run", "Run a setup with its engine and wait for the end",
+                              [offers, options] { return RunCommand(*options, offers.Output()); });
   AddSetup(runs, options->file);
-  runs->footer(
+  runs.Footer(
       "What the engine says goes to the output, how far it is and how it ended to the error stream. Ctrl-C stops the\n"
       "engine. Exit status:\n"
       "0 done, 1 the engine failed or was stopped, 2 not started.");
   const auto part = [&](const char* name, const char* argument, const char* description) {
-    return runs->add_flag_callback(
+    return runs.AddFlag(
         name, [options, argument] { options->argument = argument; }, description);
   };
-  CLI::Option* preprocessor = part("--pp", "/PP", "The preprocessor alone, whatever the setup says");
-  CLI::Option* waterMovement = part("--wm", "/WM", "Water movement alone")->excludes(preprocessor);
-  part("--wq", "/WQ", "Water quality alone")->excludes(preprocessor)->excludes(waterMovement);
-  runs->add_option("--engines", options->engines,
-                   "The folder of the engines; without it TERVANE_ENGINES, or engines/ beside the program");
-  runs->add_flag("--json", options->json, "How it ended as JSON; what the engine says goes to the error stream");
+  CommandOption preprocessor = part("--pp", "/PP", "The preprocessor alone, whatever the setup says");
+  CommandOption waterMovement = part("--wm", "/WM", "Water movement alone").Excludes(preprocessor);
+  part("--wq", "/WQ", "Water quality alone").Excludes(preprocessor).Excludes(waterMovement);
+  runs.Add("--engines", options->engines,
+           "The folder of the engines; without it TERVANE_ENGINES, or engines/ beside the program");
+  runs.AddFlag("--json", options->json, "How it ended as JSON; what the engine says goes to the error stream");
 }
 
 }  // namespace tervane

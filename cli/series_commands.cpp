@@ -108,29 +108,26 @@ int ImportSeriesCommand(const SeriesImport& import, Streams streams) {
 
 }  // namespace
 
-void OfferSeriesImport(CommandOffers& offers, CLI::App* family) {
+void OfferSeriesImport(CommandOffers& offers, const Command& family) {
   auto options = std::make_shared<SeriesImport>();
-  CLI::App* series = offers.Command(
+  Command series = offers.Offer(
       "series", "Make time series (.nds0) of columns of a table (CSV)",
-      [offers, options] { return ImportSeriesCommand(*options, offers.Output()); }, family);
-  series->add_option("CSV", options->in, "The table: names in its first line, ISO dates in its first column")
-      ->required();
-  series->add_option("OUT", options->out, "The data file to write")->required();
-  AddQuantity(series, options->itemType)->required();
-  CLI::Option* column = series->add_option("--column", options->columns,
-                                           "The name of the column; not needed where there is only one. Given several "
-                                           "times, each makes an item");
-  column->allow_extra_args(false);
-  series->add_flag("--all-columns", options->isEveryColumn, "An item of each column")->excludes(column);
-  series->add_option("--unit", options->unit, "The unit of the values; the item type's base unit without it");
-  const std::map<std::string, int> valueTypes{
-      {"instantaneous", 0}, {"accumulated", 1}, {"step-accumulated", 2}, {"mean-step", 3}};
-  series->add_option("--value-type", options->valueType, "How a value belongs to its stamp")
-      ->transform(CLI::CheckedTransformer(valueTypes));
-  const std::map<std::string, bool> stampPlaces{{"begin", true}, {"end", false}};
-  series->add_option("--stamps", options->stampsAreBegins, "Which end of its interval a stamp is; end without it")
-      ->transform(CLI::CheckedTransformer(stampPlaces));
-  series->add_flag("--force", options->force, "Replace a file that exists");
+      [offers, options] { return ImportSeriesCommand(*options, offers.Output()); }, &family);
+  series.Add("CSV", options->in, "The table: names in its first line, ISO dates in its first column").Required();
+  series.Add("OUT", options->out, "The data file to write").Required();
+  AddQuantity(series, options->itemType).Required();
+  CommandOption column = series.Add("--column", options->columns,
+                                    "The name of the column; not needed where there is only one. Given several "
+                                    "times, each makes an item");
+  column.OneAtATime();
+  series.AddFlag("--all-columns", options->isEveryColumn, "An item of each column").Excludes(column);
+  series.Add("--unit", options->unit, "The unit of the values; the item type's base unit without it");
+  series.AddChoice<int>("--value-type", options->valueType,
+                        {{"instantaneous", 0}, {"accumulated", 1}, {"step-accumulated", 2}, {"mean-step", 3}},
+                        "How a value belongs to its stamp");
+  series.AddChoice<bool>("--stamps", options->stampsAreBegins, {{"begin", true}, {"end", false}},
+                         "Which end of its interval a stamp is; end without it");
+  series.AddFlag("--force", options->force, "Replace a file that exists");
 }
 
 }  // namespace tervane

@@ -112,21 +112,21 @@ int ShowCommand(const std::string& file, const std::string& typed, bool json, St
 
 void OfferTreeCommands(CommandOffers& offers) {
   auto options = std::make_shared<TreeOptions>();
-  CLI::App* tree = offers.Command("tree", "List the nodes that take part", [offers, options] {
+  Command tree = offers.Offer("tree", "List the nodes that take part", [offers, options] {
     const TreeForm form = options->json ? TreeForm::Json : options->paths ? TreeForm::Paths : TreeForm::Text;
     return TreeCommand(options->file, options->all, form, offers.Output());
   });
   AddSetup(tree, options->file);
-  tree->add_flag("--all", options->all, "Also the nodes that take no part");
-  tree->add_flag("--paths", options->paths, "One PATH a line");
-  tree->add_flag("--json", options->json, "As JSON");
+  tree.AddFlag("--all", options->all, "Also the nodes that take no part");
+  tree.AddFlag("--paths", options->paths, "One PATH a line");
+  tree.AddFlag("--json", options->json, "As JSON");
 
-  CLI::App* show = offers.Command("show", "Show nodes with their keys, as they would be saved", [offers, options] {
+  Command show = offers.Offer("show", "Show nodes with their keys, as they would be saved", [offers, options] {
     return ShowCommand(options->file, options->path, options->json, offers.Output());
   });
   AddSetup(show, options->file);
-  show->add_option("PATH", options->path, "The node; without it the whole setup");
-  show->add_flag("--json", options->json, "As JSON");
+  show.Add("PATH", options->path, "The node; without it the whole setup");
+  show.AddFlag("--json", options->json, "As JSON");
 }
 
 }  // namespace tervane

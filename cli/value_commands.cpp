@@ -149,10 +149,10 @@ std::string JsonKey(const KvfNode& keyword, std::string_view sectionPath, const 
 
 void OfferValueCommands(CommandOffers& offers) {
   auto options = std::make_shared<ValueOptions>();
-  CLI::App* get = offers.Command("get", "Print the value of a key, as it would be saved", [offers, options] {
+  Command get = offers.Offer("get", "Print the value of a key, as it would be saved", [offers, options] {
     return GetCommand(options->file, options->path, options->json, offers.Output());
   });
-  CLI::App* set = offers.Command("set", "Change the values of keys and save the setup", [offers, options] {
+  Command set = offers.Offer("set", "Change the values of keys and save the setup", [offers, options] {
     if (options->more.size() % 2 != 0)
       return Refuse(offers.Output(), fmt::format("{}: a value was expected behind this key", options->more.back()));
     std::vector<Change> changes{{options->path, options->value}};
@@ -160,18 +160,18 @@ void OfferValueCommands(CommandOffers& offers) {
       changes.push_back({options->more[i], options->more[i + 1]});
     return SetCommand(options->file, changes, options->force, offers.Output());
   });
-  for (CLI::App* command : {get, set}) {
-    AddSetup(command, options->file);
-    command->add_option("PATH", options->path, "The key, as SECTION/SECTION:KEY")->required();
+  for (Command* command : {&get, &set}) {
+    AddSetup(*command, options->file);
+    command->Add("PATH", options->path, "The key, as SECTION/SECTION:KEY").Required();
   }
-  get->add_flag("--json", options->json, "As JSON, with its meaning and its default");
-  set->add_option("VALUE", options->value, "The value; see VALUES")->required();
-  set->add_option("MORE", options->more, "Further keys, each with its value behind it; all are changed, or none");
-  set->footer(
+  get.AddFlag("--json", options->json, "As JSON, with its meaning and its default");
+  set.Add("VALUE", options->value, "The value; see VALUES").Required();
+  set.Add("MORE", options->more, "Further keys, each with its value behind it; all are changed, or none");
+  set.Footer(
       "VALUES. As the file holds them, several separated by commas; as a page takes them: the text of a choice\n"
       "(\"Richards equation\"), a number with a unit (\"2 days\"), a date (2000-01-31, \"2000-01-31 12:00\"), a list "
       "(3, 4).");
-  set->add_flag("--force", options->force, "Also where an editor has the setup open");
+  set.AddFlag("--force", options->force, "Also where an editor has the setup open");
 }
 
 }  // namespace tervane

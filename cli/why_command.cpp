@@ -65,12 +65,12 @@ int WhyCommand(const std::string& file, const std::string& typed, bool json, Str
 
 void OfferWhyCommand(CommandOffers& offers) {
   auto options = std::make_shared<WhyOptions>();
-  CLI::App* why = offers.Command("why", "Tell why a node takes part or not", [offers, options] {
+  Command why = offers.Offer("why", "Tell why a node takes part or not", [offers, options] {
     return WhyCommand(options->file, options->path, options->json, offers.Output());
   });
   AddSetup(why, options->file);
-  why->add_option("PATH", options->path, "The node; without it all that is missing, and what would bring it");
-  why->add_flag("--json", options->json, "As JSON");
+  why.Add("PATH", options->path, "The node; without it all that is missing, and what would bring it");
+  why.AddFlag("--json", options->json, "As JSON");
 }
 
 }  // namespace tervane

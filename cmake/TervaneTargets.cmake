@@ -22,7 +22,6 @@ set(TERVANE_HEADERS_core <algorithm> <cmath> <functional> <map> <memory> <option
 set(TERVANE_HEADERS_model ${TERVANE_HEADERS_core} "${PROJECT_SOURCE_DIR}/core/list.h")
 set(TERVANE_HEADERS_pages ${TERVANE_HEADERS_model} "${PROJECT_SOURCE_DIR}/forms/page_rows.h"
   "${PROJECT_SOURCE_DIR}/forms/plots.h" "${PROJECT_SOURCE_DIR}/forms/table_of.h")
-set(TERVANE_HEADERS_commands ${TERVANE_HEADERS_model} <CLI/CLI.hpp>)
 set(TERVANE_HEADERS_desktop ${TERVANE_HEADERS_core} <QBoxLayout> <QLabel> <QPainter> <QString> <QToolButton> <QWidget>
   "${PROJECT_SOURCE_DIR}/forms/page.h" "${PROJECT_SOURCE_DIR}/forms/plots.h")
 set(TERVANE_HEADERS_test ${TERVANE_HEADERS_core} <gmock/gmock.h> <gtest/gtest.h>)
@@ -42,11 +41,11 @@ function(tervane_precompile target kind)
   endif()
 endfunction()
 
-# tervane_library([DESKTOP|COMMANDS] LINKS ...): the folder as a library of the folder's name, `tervane_pages_spatial` for
+# tervane_library([DESKTOP] LINKS ...): the folder as a library of the folder's name, `tervane_pages_spatial` for
 # pages/spatial, without a main.cpp. LINKS are public: who links a floor sees the floors below it. DESKTOP is said where
-# the toolkit is used, COMMANDS where options are parsed.
+# the toolkit is used.
 function(tervane_library)
-  cmake_parse_arguments(ARG "DESKTOP;COMMANDS" "" "LINKS" ${ARGN})
+  cmake_parse_arguments(ARG "DESKTOP" "" "LINKS" ${ARGN})
   file(RELATIVE_PATH folder ${PROJECT_SOURCE_DIR} ${CMAKE_CURRENT_SOURCE_DIR})
   string(REPLACE "/" "_" name tervane_${folder})
   file(GLOB sources CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/*.cpp)
@@ -57,8 +56,6 @@ function(tervane_library)
   if(ARG_DESKTOP)
     set_target_properties(${name} PROPERTIES AUTOMOC ON)
     tervane_precompile(${name} desktop)
-  elseif(ARG_COMMANDS)
-    tervane_precompile(${name} commands)
   elseif(folder IN_LIST TERVANE_GROUND)
     tervane_precompile(${name} core)
   elseif(folder MATCHES "^(forms|pages)")
