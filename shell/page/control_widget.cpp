@@ -20,7 +20,7 @@ namespace tervane {
 
 namespace {
 
-constexpr int kWidestLabel = 300;  ///< In pixels at zoom 1; a longer label breaks into lines.
+constexpr int kWidestLabel = 280;  ///< In pixels at zoom 1; a longer label breaks into lines.
 constexpr int kMarkSize = 16, kDotSize = 6;
 
 /// Stands behind a value that is not its default.

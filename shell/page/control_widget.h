@@ -39,6 +39,8 @@ class ControlWidget : public QObject {
   virtual bool GrowsDown() const { return false; }
   /// Whether the field grows with the window beyond the width of a form.
   virtual bool GrowsRight() const { return false; }
+  /// The width at which nothing of it is hidden, where that may be more than it needs; 0 where it is not.
+  virtual int WantedWidth() const { return 0; }
 
   /// Shows the value as the page has it and applies the page's rules; a text that was refused stays in its field.
   void Sync();

@@ -22,7 +22,7 @@ namespace tervane {
 
 namespace {
 
-constexpr int kNumberWidth = 150;
+constexpr int kNumberWidth = 120;
 constexpr int kDateWidth = 190;
 constexpr int kTextWidth = 420;
 

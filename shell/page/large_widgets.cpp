@@ -26,6 +26,7 @@ class TableWidget : public ControlWidget {
   }
   bool GrowsDown() const override { return true; }
   bool GrowsRight() const override { return true; }
+  int WantedWidth() const override { return table_->WantedWidth(); }
   QWidget* FocusTarget() const override { return table_->FocusTarget(); }
   void Commit() override { table_->Commit(); }
 

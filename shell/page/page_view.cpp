@@ -25,10 +25,11 @@ namespace tervane {
 
 namespace {
 
-constexpr int kWidestForm = 860;  ///< In pixels at zoom 1: lines stay short enough to be read.
-constexpr int kSideBySide = 760;  ///< From this width of a page on its map stands beside the form.
-constexpr int kFormBesidePlot = 530;
-constexpr int kMostFindings = 4;  ///< Lines below a form; the tab of findings has them all.
+constexpr int kWidestForm = 860;      ///< In pixels at zoom 1: lines stay short enough to be read.
+constexpr int kSideBySide = 700;      ///< From this width of a page on its map stands beside the form.
+constexpr int kFormBesidePlot = 370;  ///< At least: some 28 letters m.
+constexpr int kLeastPlot = 300;       ///< Width of a map beside a form, height of one below it.
+constexpr int kMostFindings = 4;      ///< Lines below a form; the tab of findings has them all.
 
 enum Column { kLabelColumn, kFieldColumn };
 
@@ -98,11 +99,12 @@ void PageView::Build(const QString& placeText, const QString& path) {
   column->setContentsMargins(margin, theme.Scaled(4), margin, margin);
   auto* row = new QHBoxLayout;
   row->setContentsMargins(0, 0, 0, 0);
-  if (!growsRight_) form->setMaximumWidth(std::max(theme.Scaled(kWidestForm), widest_));
+  formPlace_ = form;
+  content_ = column;
   row->addWidget(form, 1);
-  if (!growsRight_) row->addStretch(0);
-  column->addLayout(row, growsDown_ ? 1 : 0);
-  if (!growsDown_) column->addStretch(1);
+  row->addStretch(0);
+  column->addLayout(row);
+  column->addStretch(1);
 
   scroll_ = new QScrollArea;
   scroll_->setFrameShape(QFrame::NoFrame);
@@ -116,7 +118,12 @@ void PageView::Build(const QString& placeText, const QString& path) {
     split_ = new QSplitter;
     split_->setChildrenCollapsible(false);
     split_->addWidget(scroll_);
-    split_->addWidget(plotPlace_);
+    plotScroll_ = new QScrollArea;
+    plotScroll_->setFrameShape(QFrame::NoFrame);
+    plotScroll_->setFocusPolicy(Qt::NoFocus);
+    plotScroll_->setWidgetResizable(true);
+    plotScroll_->setWidget(plotPlace_);
+    split_->addWidget(plotScroll_);
     split_->setStretchFactor(1, 1);
     all->addWidget(split_, 1);
   }
@@ -192,8 +199,6 @@ QWidget* PageView::BuildCell(Control& control, int depth) {
   }
   ControlWidget& made = *widgets_.emplace_back(ControlWidget::Make(page_, control));
   connect(&made, &ControlWidget::UnitChosen, this, &PageView::UnitChosen);
-  growsDown_ |= made.GrowsDown();
-  growsRight_ |= made.GrowsRight();
   return made.Field();
 }
 
@@ -246,7 +251,7 @@ void PageView::AddRow(Form& built, const std::vector<Control*>& row) {
     }
     grid.addLayout(others, line, kFieldColumn);
   }
-  if (growsDown) grid.setRowStretch(line, 1);
+  if (growsDown) growing_.push_back({&grid, line, cell});
 }
 
 void PageView::AddPlot(Control& control) {
@@ -264,29 +269,74 @@ void PageView::AddPlot(Control& control) {
   plots_.push_back(&control);
 }
 
+void PageView::MeasureForm() {
+  // What was hidden or shown just now is known to the layout around it, not to those above: from the inside out.
+  const QList<QLayout*> layouts = formPlace_->findChildren<QLayout*>();
+  for (QLayout* layout : layouts) layout->invalidate();
+  std::for_each(layouts.rbegin(), layouts.rend(), [](QLayout* layout) { layout->activate(); });
+  neededByForm_ = formPlace_->minimumSizeHint().width();
+}
+
+void PageView::SyncStretch() {
+  // What is hidden leaves its room to the others.
+  for (const GrowingRow& row : growing_) row.grid->setRowStretch(row.line, row.cell->isVisibleTo(this) ? 1 : 0);
+  const auto hasShown = [this](bool (ControlWidget::*grows)() const) {
+    return std::ranges::any_of(widgets_, [&](const auto& widget) {
+      return ((*widget).*grows)() && std::ranges::find(plots_, &widget->Described()) == plots_.end() &&
+             widget->Field()->isVisibleTo(this);
+    });
+  };
+  const bool growsDown = hasShown(&ControlWidget::GrowsDown);
+  const int widest = std::max(Theme::Get().Scaled(kWidestForm), widest_);
+  formPlace_->setMaximumWidth(hasShown(&ControlWidget::GrowsRight) ? QWIDGETSIZE_MAX : widest);
+  content_->setStretch(0, growsDown ? 1 : 0);
+  const bool hasPlots = plotPlace_ && !arePlotsBeside_ && plotPlace_->isVisibleTo(this);
+  content_->setStretch(content_->count() - 1, growsDown || hasPlots ? 0 : 1);
+}
+
+void PageView::MovePlots(bool beside) {
+  if (beside == arePlotsBeside_) return;
+  arePlotsBeside_ = beside;
+  const bool isShown = !plotPlace_->isHidden();
+  if (beside) {
+    content_->removeWidget(plotPlace_);
+    plotPlace_->setMinimumHeight(0);
+    plotScroll_->setWidget(plotPlace_);
+  } else {
+    plotScroll_->takeWidget();
+    content_->insertWidget(1, plotPlace_, 1);
+  }
+  plotPlace_->setVisible(isShown);
+}
+
 void PageView::PlacePlots() {
   const Theme& theme = Theme::Get();
-  // Beside a form of a few lines a map would be narrow for nothing.
-  const int neededHeight = scroll_->widget()->sizeHint().height();
-  const bool isWide = width() >= theme.Scaled(kSideBySide) && neededHeight > height() / 3;
-  const auto orientation = isWide ? Qt::Horizontal : Qt::Vertical;
-  const int all = isWide ? width() : height();
+  const auto count = std::ranges::count_if(plots_, [](const Control* control) { return control->IsShown(); });
+  // The width alone decides: a bar below that opens moves nothing from side to side.
   const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
-  const int neededWidth = scroll_->widget()->minimumSizeHint().width() + bar;
-  // Above a map the form takes no more than it needs.
-  const int most = isWide ? all * 3 / 5 : all / 2;
-  const int form = isWide ? std::clamp(neededWidth, std::min(theme.Scaled(kFormBesidePlot), most), most)
-                          : std::min(neededHeight, most);
+  const QMargins margins = content_->contentsMargins();
+  const int edges = margins.left() + margins.right() + bar;
+  const int needed = neededByForm_ + edges;
+  MovePlots(width() >= std::max(theme.Scaled(kSideBySide), needed + theme.Scaled(kLeastPlot)));
+  plotScroll_->setVisible(arePlotsBeside_ && count > 0);
+  if (!arePlotsBeside_) {
+    plotPlace_->setMinimumHeight(static_cast<int>(count) * theme.Scaled(kLeastPlot));
+    return;
+  }
+  int wanted = std::max(needed, theme.Scaled(kFormBesidePlot));
+  for (const auto& widget : widgets_)
+    if (widget->Field()->isVisibleTo(this)) wanted = std::max(wanted, widget->WantedWidth() + edges);
+  const int form = std::min(wanted, std::max(needed, width() * 3 / 5));
   // What the user has moved stays until the page is another one.
-  if (split_->orientation() == orientation && formSize_ == form) return;
+  if (formSize_ == form) return;
   formSize_ = form;
-  split_->setOrientation(orientation);
-  split_->setSizes({form, std::max(all - form, 1)});
+  split_->setSizes({form, std::max(width() - form, 1)});
 }
 
 void PageView::resizeEvent(QResizeEvent* event) {
   QWidget::resizeEvent(event);
   if (split_) PlacePlots();
+  SyncStretch();
 }
 
 void PageView::AlignLabels() {
@@ -329,7 +379,9 @@ void PageView::Sync() {
   }
   if (plotPlace_)
     plotPlace_->setVisible(std::ranges::any_of(plots_, [](const Control* control) { return control->IsShown(); }));
+  MeasureForm();
   if (split_ && isVisible()) PlacePlots();
+  SyncStretch();
   SyncFindings();
 }
 

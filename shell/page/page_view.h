@@ -10,6 +10,7 @@
 #include "forms/page.h"
 #include "pages/key_defaults.h"
 
+class QBoxLayout;
 class QGridLayout;
 class QLabel;
 class QScrollArea;
@@ -67,6 +68,10 @@ class PageView : public QWidget {
   /// A map or chart of the page itself stands beside the form, or below it where the page is narrow.
   void AddPlot(Control& control);
   void PlacePlots();
+  void MeasureForm();
+  void MovePlots(bool beside);
+  /// What is shown and can use height or width gets what is left.
+  void SyncStretch();
   void AlignLabels();
   void SyncFindings();
   /// The control of a key, a label or a name of `NameOf`; one that is shown if there is one. Null when there is none.
@@ -86,10 +91,21 @@ class PageView : public QWidget {
   std::vector<const Control*> plots_;
   QSplitter* split_ = nullptr;
   QWidget* plotPlace_ = nullptr;
-  int formSize_ = 0;  ///< Of the form beside or above a plot, when it was given its place.
+  QScrollArea* plotScroll_ = nullptr;  ///< Holds the plots beside the form; below it they scroll with it.
+  bool arePlotsBeside_ = true;
+  int formSize_ = 0;  ///< Width of the form beside a plot, when it was given its place.
+  /// A row of a form with a field that can use height.
+  struct GrowingRow {
+    QGridLayout* grid;
+    int line;
+    QWidget* cell;
+  };
+  std::vector<GrowingRow> growing_;
+  QWidget* formPlace_ = nullptr;
+  int neededByForm_ = 0;  ///< The least width in which nothing of it is cut.
+  QBoxLayout* content_ = nullptr;
   QLabel* findings_;
   QScrollArea* scroll_;
-  bool growsDown_ = false, growsRight_ = false;
   int widest_ = 0;  ///< What a row of groups would like to have.
 };
 

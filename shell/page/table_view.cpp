@@ -21,7 +21,8 @@
 
 namespace tervane {
 
-constexpr int kTableWidth = 500;  ///< Of a table that is only shown, so that it can be read beside a map.
+constexpr int kTableWidth = 500;  ///< Of a table whose columns are not known yet.
+constexpr int kLeastWidth = 320;  ///< Of a table that is only shown, so that it can be read beside a map.
 
 TableView::TableView(CYbSEDlgBase& page, Control& control) : page_(page), control_(control) {
   auto* all = new QVBoxLayout(this);
@@ -90,7 +91,7 @@ void TableView::MakeView() {
   static_cast<QVBoxLayout*>(layout())->addWidget(view_, 1);
   if (!control_.table->IsShownOnly()) return;
   view_->setSelectionBehavior(QAbstractItemView::SelectRows);
-  view_->setMinimumWidth(std::min(theme.Scaled(kTableWidth), WidthOfColumns()));
+  view_->setMinimumWidth(std::min(theme.Scaled(kLeastWidth), WidthOfColumns()));
   view_->verticalHeader()->setVisible(control_.table->HasRowHeads());
 }
 
@@ -123,6 +124,10 @@ void TableView::ConnectView() {
     if (control_.table->IsLink(index.row() + 1, index.column() + 1)) press(index.row(), index.column());
   });
   connect(model_, &QAbstractItemModel::modelReset, this, &TableView::FitColumns);
+  connect(view_->horizontalHeader(), &QHeaderView::sectionResized, this, [this] {
+    if (!isFitting_ && (QApplication::mouseButtons() & Qt::LeftButton) && view_->horizontalHeader()->underMouse())
+      areColumnsTheUsers_ = true;
+  });
   connect(view_->selectionModel(), &QItemSelectionModel::selectionChanged, this, &TableView::SyncButtons);
   connect(view_->selectionModel(), &QItemSelectionModel::currentChanged, this,
           [this](const QModelIndex& current, const QModelIndex& before) {
@@ -143,6 +148,11 @@ void TableView::ConnectView() {
 }
 
 QWidget* TableView::FocusTarget() const { return view_; }
+
+int TableView::WantedWidth() const {
+  const QHeaderView& rowHeads = *view_->verticalHeader();
+  return WidthOfColumns() + (rowHeads.isHidden() ? 0 : rowHeads.sizeHint().width());
+}
 
 void TableView::Sync() {
   isSyncing_ = true;
@@ -369,10 +379,7 @@ bool TableView::eventFilter(QObject* watched, QEvent* event) {
 
 void TableView::resizeEvent(QResizeEvent* event) {
   QWidget::resizeEvent(event);
-  if (hasFittedColumns_ || (!isVisible() && !control_.table->IsShownOnly())) return;
-  // Columns that do not fit begin narrower; from then on they are the user's. What is only shown follows its room.
-  hasFittedColumns_ = !control_.table->IsShownOnly();
-  FitColumns();
+  if (!areColumnsTheUsers_) FitColumns();
 }
 
 int TableView::WidthOfColumns() const {
@@ -385,6 +392,7 @@ int TableView::WidthOfColumns() const {
 }
 
 void TableView::FitColumns() {
+  isFitting_ = true;
   // The view itself is laid out later.
   const int edges = 2 * view_->frameWidth() + style()->pixelMetric(QStyle::PM_ScrollBarExtent);
   const QHeaderView& rowHeads = *view_->verticalHeader();
@@ -407,6 +415,7 @@ void TableView::FitColumns() {
   }
   const TableColumn* last = control_.table->Column(model_->columnCount());
   head.setStretchLastSection(!last || !last->IsButton());
+  isFitting_ = false;
 }
 
 void TableView::OfferUnits(int column, const QPoint& place) {

@@ -24,6 +24,8 @@ class TableView : public QWidget {
   void Sync();
   void Commit();
   QWidget* FocusTarget() const;
+  /// The width at which all columns are as wide as they begin.
+  int WantedWidth() const;
 
   void Copy();
   void Cut();
@@ -73,7 +75,8 @@ class TableView : public QWidget {
   QTableView* view_;
   QLabel* message_;
   QToolButton *insert_, *delete_, *up_, *down_;
-  bool hasFittedColumns_ = false;
+  bool areColumnsTheUsers_ = false;  ///< He has moved an edge: they stay as he has them.
+  bool isFitting_ = false;
   bool isSyncing_ = false;
   bool isSelectedByHead_ = false;  ///< In a table of one column each cell would be a whole row.
 };

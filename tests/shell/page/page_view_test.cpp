@@ -8,11 +8,13 @@
 #include <QPlainTextEdit>
 #include <QScrollArea>
 #include <QScrollBar>
+#include <QTableView>
 #include <algorithm>
 
 #include <gmock/gmock.h>
 
 #include "pages/tree_entries.h"
+#include "shell/maps/map_canvas.h"
 #include "shell/widgets/theme.h"
 #include "tests/shell/opened_setup.h"
 #include "tests/support/preprocessed_run.h"
@@ -100,6 +102,57 @@ TEST(PageView, WhatIsTypedIsEnteredBeforeACommandAndWhenAnotherPageIsShown) {
   EXPECT_EQ(setup.Value("SimSpec/SimTitle:Description"), "two\nlines");
 }
 
+// ---- Arrangement
+
+PageView& ShownPage(OpenedSetup& setup) {
+  // Pages that were left may not be deleted yet.
+  const auto all = setup.Frame().findChildren<PageView*>();
+  return **std::ranges::find_if(all, &PageView::isVisible);
+}
+
+TEST(PageView, TheWidthAlonePutsAMapBesideOrBelowTheForm) {
+  OpenedSetup setup("section Topography {\nType = 2\n}");
+  setup.GoTo("Topography");
+  const struct {
+    QSize window;
+    bool isBeside;
+  } cases[] = {{{1280, 800}, true},  {{1280, 560}, true}, {{900, 600}, false},
+               {{900, 1100}, false}, {{800, 500}, false}, {{1920, 1080}, true}};
+  for (const auto& c : cases) {
+    SCOPED_TRACE(FromQt(QString("%1x%2").arg(c.window.width()).arg(c.window.height())));
+    setup.Window().resize(c.window);
+    QApplication::processEvents();
+    PageView& page = ShownPage(setup);
+    const auto placeOf = [&page](const QWidget& widget) { return QRect(widget.mapTo(&page, QPoint()), widget.size()); };
+    const QRect map = placeOf(*page.findChild<MapCanvas*>());
+    const QRect field = placeOf(*page.findChild<QComboBox*>());
+    EXPECT_EQ(setup.Window().size(), c.window) << "nothing needs a larger window";
+    if (c.isBeside) {
+      EXPECT_GT(map.left(), field.right());
+      EXPECT_GT(map.width(), page.width() * 2 / 5) << "what the form does not need";
+    } else {
+      EXPECT_GT(map.top(), field.bottom());
+      EXPECT_GT(map.height(), 200) << "whatever height there is, for the page scrolls";
+    }
+  }
+}
+
+TEST(PageView, AHiddenTableLeavesItsRoom) {
+  OpenedSetup setup("section LandUse {\nsection Vegetation {\nsection GLOBAL {\nTYPE = 3\n}\n}\n}");
+  setup.GoTo("LandUse/Vegetation:TYPE");
+  const auto* table = ShownPage(setup).findChild<QTableView*>();
+  EXPECT_GT(table->height(), 200);
+  setup.Press(Qt::Key_Home);
+  setup.Press(Qt::Key_Return);
+  ASSERT_FALSE(table->isVisible());
+  QApplication::processEvents();
+  const auto buttons = ShownPage(setup).findChildren<QAbstractButton*>();
+  const auto parameters = std::ranges::find_if(
+      buttons, [](const QAbstractButton* button) { return button->text().startsWith("ET parameters"); });
+  ASSERT_NE(parameters, buttons.end());
+  EXPECT_LT((*parameters)->mapTo(&ShownPage(setup), QPoint()).y(), 300);
+}
+
 // ---- Pictures
 
 /// What is cut or lies over something else on the page that is shown.
@@ -144,12 +197,14 @@ constexpr const char* kSetups[] = {
     "section SimSpec {\nModelType = 1\nsection ModModelComp {\nSubsurface_ModelType = 2\nWithAirFlow = 1\n}\n}"};
 
 TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
-  for (const double zoom : {1.0, 1.5}) {
+  const struct {
+    double zoom;
+    QSize window;
+  } cases[] = {{1, {1280, 800}}, {1.5, {1280, 800}}, {1, {900, 600}}};
+  for (const auto& [zoom, window] : cases) {
     Theme::Get().SetZoom(zoom);
     for (const char* sections : kSetups) {
-      OpenedSetup setup(sections);
-      // Larger letters are for larger screens: what is cut here is cut on each of them.
-      setup.Window().resize(setup.Window().size() * zoom);
+      OpenedSetup setup(sections, window);
       test::WritePreprocessedRun(setup.Folder().File("karup_results"), "karup");
       setup.Frame().RebuildProcessedData();
       int pages = 0;
@@ -165,11 +220,9 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
         SCOPED_TRACE(path + " at " + std::to_string(zoom));
         setup.GoTo(path);
         QApplication::processEvents();
-        // Pages that were left may not be deleted yet.
-        const auto all = setup.Frame().findChildren<PageView*>();
-        const auto page = std::ranges::find_if(all, &PageView::isVisible);
-        ASSERT_NE(page, all.end());
-        EXPECT_EQ(Faults(**page), "");
+        // Layouts within layouts settle one after the other.
+        for (int i = 0; i < 3; ++i) QApplication::processEvents();
+        EXPECT_EQ(Faults(ShownPage(setup)), "");
         ++pages;
       }
       EXPECT_GT(pages, 5);
