@@ -25,8 +25,8 @@ void LetStandOut(MapContent& map, const Highlight& highlighted) {
 }
 
 bool LooksSame(const MapContent& a, const MapContent& b) {
-  return a.grids == b.grids && a.shapes == b.shapes && a.lines == b.lines && a.points == b.points && a.area == b.area &&
-         a.message == b.message;
+  return a.grids == b.grids && a.shapes == b.shapes && a.lines == b.lines && a.points == b.points &&
+         a.domain == b.domain && a.area == b.area && a.message == b.message;
 }
 
 bool LooksSame(const SectionContent& a, const SectionContent& b) {

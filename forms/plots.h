@@ -64,6 +64,7 @@ struct ShapeLayer {
   std::optional<double> lineWidth = {};    ///< In pixels.
   bool isFilled = false;                   ///< Polygons have a quiet colour for each value, and a legend.
   bool withLabels = false;                 ///< Polygons bear their value where it fits.
+  bool isDomain = false;                   ///< The outline of the model's domain, in a colour of its own.
   /// What values are called in the legend and on the map; a value without a name is told.
   std::vector<std::pair<std::string, std::string>> names = {};
 
@@ -136,6 +137,8 @@ struct MapContent {
   std::vector<ShapeLayer> shapes;
   std::vector<LineLayer> lines;
   std::vector<PointLayer> points;
+  /// A line over all grids, shapes and lines that shows where the model lies; nobody points at it. Null for none.
+  std::shared_ptr<const CYbShapeData> domain = {};
   std::optional<Envelope> area;  ///< Shown at first; the envelope of all layers when nothing is said.
   std::string message;           ///< Shown in the place of a map that has nothing to show.
   std::function<void(const MapPick& pick)> picked;  ///< A click of the user; may be empty.

@@ -113,6 +113,7 @@ MapContent DataFileView::Map() {
   file.Items = {chosen_.front()};
   map = FileMap(file, slice_);
   if (map.grids.empty()) return map;
+  if (putOver_) putOver_(map);
   grid_ = map.grids.front().grid;
   map.grids.front().isCodes = Item().itemType == quantity::kCode;
   if (Steps() > 1 || Layers() > 1) map.grids.front().range = WholeRange();

@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <deque>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -60,6 +61,8 @@ class DataFileView {
   /// The step whose stamp is nearest to a date that a user typed, or what was expected.
   std::string FindDate(const std::string& typed, std::size_t& step) const;
 
+  /// What is put over each map, such as where a model lies.
+  void PutOverMaps(std::function<void(MapContent& map)> put) { putOver_ = std::move(put); }
   MapContent Map();
   SeriesContent Chart() const;
 
@@ -102,6 +105,7 @@ class DataFileView {
   std::string Shown(float value, const FieldUnit& unit) const;
 
   std::string path_;
+  std::function<void(MapContent& map)> putOver_;
   const DisplayUnits* units_;
   FileStamp stamp_;
   DataFile file_;

@@ -12,6 +12,7 @@
 #include <QMenuBar>
 #include <QMessageBox>
 #include <QMimeData>
+#include <QPointer>
 #include <QPushButton>
 #include <QStackedWidget>
 #include <QStatusBar>
@@ -21,6 +22,7 @@
 
 #include "document/edit_session.h"
 #include "libraries/library_kinds.h"
+#include "pages/parts/plot_content.h"
 #include "platform/files.h"
 #include "platform/text_fields.h"
 #include "shell/changes_dialog.h"
@@ -142,7 +144,12 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
       frame, &DocumentFrame::ReloadWanted, this, [this, frame] { ReloadDocument(frame); }, Qt::QueuedConnection);
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
   connect(frame, &DocumentFrame::Told, this, [this](const QString& text) { statusBar()->showMessage(text, kToldFor); });
-  connect(frame, &DocumentFrame::DataFileWanted, this, &MainWindow::ShowDataFile);
+  connect(frame, &DocumentFrame::DataFileWanted, this, [this, frame](const QString& path) {
+    if (!ShowDataFile(path) || !Viewer()) return;
+    Viewer()->PutOverMaps([setup = QPointer(frame)](MapContent& map) {
+      if (setup) AddDomainOutline(setup->Session().Document().Root(), map);
+    });
+  });
   tabs_->setCurrentIndex(tabs_->addTab(frame, frame->Title()));
   frame->FocusNextPane();
   SyncCommands();

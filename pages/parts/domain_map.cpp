@@ -10,7 +10,9 @@
 
 namespace tervane {
 
-MapContent DomainMap(const CYbSEKvfBase& node) {
+namespace {
+
+MapContent MapOf(const CYbSEKvfBase& node) {
   auto* domain = node.Important(kDomain);
   if (!domain) return {};
   if (domain->Type == CCatchmentKvf::kGridFile) {
@@ -31,6 +33,15 @@ MapContent DomainMap(const CYbSEKvfBase& node) {
   MapContent outline = ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
   if (!outline.shapes.empty()) map.shapes.insert(map.shapes.begin(), std::move(outline.shapes.front()));
   std::ranges::move(outline.awaited, std::back_inserter(map.awaited));
+  return map;
+}
+
+}  // namespace
+
+MapContent DomainMap(const CYbSEKvfBase& node) {
+  MapContent map = MapOf(node);
+  // What shows the domain needs no line around it.
+  map.domain = nullptr;
   return map;
 }
 

@@ -9,11 +9,13 @@
 
 #include <fmt/format.h>
 
+#include "geometry/grid_outline.h"
 #include "overlays/overlays.h"
 #include "pages/parts/river_map.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
 #include "simspec/periods.h"
+#include "spatial/domain.h"
 
 namespace tervane {
 
@@ -116,6 +118,18 @@ std::shared_ptr<Computed<CTvnShapeData>> RecentShapes(const std::string& path, c
                    });
 }
 
+/// The lines around the cells of a grid that hold a value.
+std::shared_ptr<Computed<CTvnShapeData>> RecentOutline(const std::string& path, int item) {
+  static RecentFiles<FileKey, CTvnShapeData> outlines;
+  return outlines.Get({path, {StampOf(path)}, item, {}, {}}, path,
+                      [path, item](CTvnShapeData& outline, ProgressPart progress) {
+                        CTvn2DOrthoRotatedGridData grid;
+                        FileResult read = ReadGridData(path, item, grid, progress);
+                        if (read.Ok()) MakeOutline(grid, outline);
+                        return read;
+                      });
+}
+
 std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item) {
   static RecentFiles<FileKey, Series> files;
   return files.Get({path, {StampOf(path)}, item, {}, {}}, path, [path, item](Series& series, ProgressPart progress) {
@@ -164,11 +178,29 @@ MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRo
 }
 
 void AddBackdrop(const CYbSEKvfBase& node, MapContent& map) {
+  AddDomainOutline(node, map);
   // The data stay first for what a user points at, whatever lies below them.
   const COverlaysKvf* overlays = node.Important(kOverlays);
   if (!overlays) return;
   AddLayers(overlays->Background(), map);
   AddLayers(overlays->Foreground(), map);
+}
+
+void AddDomainOutline(const CYbSEKvfBase& node, MapContent& map) {
+  const CCatchmentKvf* domain = node.Important(kDomain);
+  for (const CYbSEKvfBase* above = &node; domain && above; above = above->GetParent())
+    if (above == domain) domain = nullptr;
+  if (!domain) return;
+  const auto show = [&map](const std::shared_ptr<Computed<CTvnShapeData>>& outline) {
+    map.domain = NowOrAwaited(outline, map.awaited);
+  };
+  const bool isShape = domain->Type == CCatchmentKvf::kShapeFile;
+  const CData2DShpFile& shape = domain->ShapeFile();
+  const CTvnData2DNdsFile& grid = domain->GridFile();
+  if (isShape && !shape.File.IsEmpty() && shape.WhyNotValid().empty())
+    show(RecentShapes(shape.File.Absolute(), {}, domain->ShapeAxisUnit));
+  if (!isShape && !grid.File.IsEmpty() && grid.WhyNotValid().empty())
+    show(RecentOutline(grid.File.Absolute(), grid.SelectedItem()));
 }
 
 MapContent GridMap(const CYbSEKvfBase& node, const std::shared_ptr<ComputedGrid>& grid) {

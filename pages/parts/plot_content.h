@@ -25,8 +25,10 @@ MapContent GridFileMap(const CYbSEKvfBase& node, const std::string& path, int it
 MapContent FileMap(const DataFileNode& file, const GridSlice& slice = {});
 /// A map of a shape file with its attribute.
 MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit);
-/// Puts the setup's layers behind and over what the map of a node shows.
+/// Puts the setup's layers behind and over what the map of a node shows, and the outline of the domain over all.
 void AddBackdrop(const CYbSEKvfBase& node, MapContent& map);
+/// Puts the outline of the domain of that node's setup over a map, but over one of the domain itself.
+void AddDomainOutline(const CYbSEKvfBase& node, MapContent& map);
 /// A chart of the selected item of a file of series, with the simulation's period.
 SeriesContent FileChart(const DataFileNode& file);
 

@@ -84,6 +84,11 @@ DataViewer::~DataViewer() {
   delete whole_;
 }
 
+void DataViewer::PutOverMaps(std::function<void(MapContent& map)> put) {
+  file_.PutOverMaps(std::move(put));
+  if (Problem().empty()) ShowSlice();
+}
+
 QString DataViewer::Title() const { return QFileInfo(ToQt(Path())).fileName(); }
 
 QWidget* DataViewer::BuildChoices() {

@@ -4,6 +4,7 @@
 
 #include <QTimer>
 #include <QWidget>
+#include <functional>
 #include <string>
 
 #include "core/host.h"
@@ -33,6 +34,8 @@ class DataViewer : public QWidget {
  public:
   /// The user's units must outlive the viewer.
   DataViewer(const std::string& path, Host& host, const DisplayUnits& units);
+  /// What is put over the maps of the file, such as where a model lies.
+  void PutOverMaps(std::function<void(MapContent& map)> put);
   ~DataViewer() override;
 
   const std::string& Path() const { return file_.Path(); }

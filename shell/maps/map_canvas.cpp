@@ -81,6 +81,8 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
   }
   shapes_.clear();
   for (const ShapeLayer& layer : content_.shapes) shapes_.emplace_back(layer);
+  domain_.reset();
+  if (content_.domain) domain_.emplace(ShapeLayer{.shapes = content_.domain, .isDomain = true});
   lines_.clear();
   for (const LineLayer& layer : content_.lines) lines_.emplace_back(layer, units_);
   if (wasEmpty || WholeArea() != before) isFitted_ = true;
@@ -330,10 +332,11 @@ void MapCanvas::DrawVectorPart(QPainter& painter, const DrawnMap& map) const {
   for (const ShapePicture& shapes : shapes_)
     if (!shapes.ArePoints()) shapes.Draw(painter, map);
   for (const LinePicture& lines : lines_) lines.Draw(painter, map);
+  if (domain_) domain_->Draw(painter, map);
 }
 
 void MapCanvas::DrawVectors(QPainter& painter, double pixelRatio, bool isScreen) {
-  if (shapes_.empty() && lines_.empty()) return;
+  if (shapes_.empty() && lines_.empty() && !domain_) return;
   DrawnMap map = Drawn();
   if (!isScreen) return DrawVectorPart(painter, map);
   VectorScene& scene = *vectors_;

@@ -114,6 +114,7 @@ class MapCanvas : public QWidget {
   DisplayUnits units_;
   std::vector<std::unique_ptr<Layer>> layers_;
   std::vector<ShapePicture> shapes_;
+  std::optional<ShapePicture> domain_;
   std::vector<LinePicture> lines_;
   struct VectorScene;  ///< Shapes and lines as last drawn.
   std::unique_ptr<VectorScene> vectors_;

@@ -62,6 +62,8 @@ QColor InkColor(bool isDark);
 QColor EdgeColor(bool isDark);
 /// Of lines for which no colour is told.
 QColor LineColor(bool isDark);
+/// Of the outline of the model's domain.
+QColor DomainColor(bool isDark);
 
 /// Lines with an edge around them; those of one call share it, so that none lies over another's line.
 void DrawEdgedLines(QPainter& painter, const std::vector<QPolygonF>& lines, const QColor& color, double width,

@@ -152,10 +152,11 @@ void ShapePicture::DrawOutlines(QPainter& painter, const DrawnMap& map) const {
       if (standsOut_[i] && isRing) filled.addPolygon(ScreenRing(PartOf(shape, part), map));
     }
   }
-  const QColor ink = layer_.lineColor ? QColor::fromRgb(*layer_.lineColor)
-                     : isRing         ? InkColor(map.isDark)
-                                      : LineColor(map.isDark);
-  DrawEdgedLines(painter, lines, ink, layer_.lineWidth.value_or(isRing ? 1.1 : 1.6), map);
+  const QColor ink = layer_.lineColor  ? QColor::fromRgb(*layer_.lineColor)
+                     : layer_.isDomain ? DomainColor(map.isDark)
+                     : isRing          ? InkColor(map.isDark)
+                                       : LineColor(map.isDark);
+  DrawEdgedLines(painter, lines, ink, layer_.lineWidth.value_or(layer_.isDomain ? 1.4 : isRing ? 1.1 : 1.6), map);
   if (highlighted.empty()) return;
   QColor veil = kHighlightColor;
   veil.setAlpha(colors_.empty() ? 50 : 90);

@@ -10,8 +10,11 @@
 
 #include "data/datafile_writer.h"
 #include "shell/editors/data_table.h"
+#include "shell/maps/map_canvas.h"
 #include "spatial/data2d.h"
+#include "spatial/domain.h"
 #include "tests/shell/opened_setup.h"
+#include "tests/support/data_files.h"
 
 namespace tervane {
 namespace {
@@ -44,6 +47,9 @@ TEST(DataViewer, EditShowsTheFileInATabThatFollowsItAndClosesByItself) {
   ASSERT_TRUE(topography);
   topography->Type = CData2DKvf::kGridFile;
   topography->GridFile().Choose(FileName(path, {}));
+  test::WriteCodes(setup.Folder().File("domain.nds2"), {1, 2});
+  setup.Session().Document().Root().Important(kDomain)->GridFile().Choose(
+      FileName("domain.nds2", setup.Folder().Path()));
   setup.GoTo("Topography");
   for (QPushButton* button : setup.Frame().findChildren<QPushButton*>())
     if (button->isVisible() && button->text() == "Edit...") button->click();
@@ -55,6 +61,8 @@ TEST(DataViewer, EditShowsTheFileInATabThatFollowsItAndClosesByItself) {
   EXPECT_EQ(tabs->tabText(1), "dem.nds2");
   EXPECT_FALSE(setup.Action("Save")->isEnabled());
   const auto& table = *viewer->findChild<DataTable*>();
+  EXPECT_TRUE(QTest::qWaitFor([&] { return viewer->findChild<MapCanvas*>()->Content().domain != nullptr; }))
+      << "where the model of the setup lies";
   EXPECT_TRUE(QTest::qWaitFor([&] { return Cell(table) == "10"; }));
   viewer->findChild<QSlider*>()->setValue(1);
   EXPECT_TRUE(QTest::qWaitFor([&] { return Cell(table) == "11"; }));

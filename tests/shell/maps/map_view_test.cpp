@@ -188,6 +188,32 @@ TEST(MapView, AClickPicksCellAndShapeAndADragDoesNot) {
   EXPECT_NEAR(map.Canvas().Window().centre.x, before.x - 40 * map.Canvas().Window().metresPerPixel, 1e-9);
 }
 
+TEST(MapView, TheDomainIsDrawnOverTheGridAndNobodyPointsAtIt) {
+  MapContent content;
+  content.grids = {{Counting({10, 10, 100, 0, 0, 0, {}})}};
+  ShownMap map(content);
+  const MapWindow before = map.Canvas().Window();
+  // The line is finer than a pixel.
+  const auto hasLine = [&map] {
+    const QImage picture = map.Picture();
+    const QPoint at = map.At({200, 500}).toPoint();
+    for (int dx = -2; dx <= 2; ++dx) {
+      const QColor color = picture.pixelColor(at + QPoint(dx, 0)), line = DomainColor(false);
+      if (std::abs(color.red() - line.red()) + std::abs(color.green() - line.green()) +
+              std::abs(color.blue() - line.blue()) <
+          120)
+        return true;
+    }
+    return false;
+  };
+  EXPECT_FALSE(hasLine());
+  content.domain = Square(200, 5000, 400, 600);
+  map.View().Show(content, nullptr);
+  EXPECT_TRUE(hasLine());
+  EXPECT_EQ(map.Canvas().Window().metresPerPixel, before.metresPerPixel) << "the grid fills the frame";
+  EXPECT_THAT(map.TextAt({350, 250}), testing::Not(HasSubstr("shape")));
+}
+
 TEST(MapView, TheSameContentLeavesThePictureAndAnotherGridKeepsThePlace) {
   const GridGeometry geometry{10, 10, 100, 0, 0, 0, {}};
   MapContent content;
