@@ -41,7 +41,7 @@ bool LooksSame(const Series& a, const Series& b) {
     return std::bit_cast<std::uint64_t>(x) == std::bit_cast<std::uint64_t>(y);
   };
   return a.name == b.name && a.unit == b.unit && a.isStepped == b.isStepped && a.panel == b.panel &&
-         a.times == b.times && std::ranges::equal(a.positions, b.positions, sameBits) &&
+         a.color == b.color && a.times == b.times && std::ranges::equal(a.positions, b.positions, sameBits) &&
          std::ranges::equal(a.values, b.values, sameBits);
 }
 

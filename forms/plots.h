@@ -18,6 +18,8 @@
 
 namespace tervane {
 
+class Host;
+
 /// The one thing of a layer that stands out from the others.
 struct Highlight {
   std::optional<float> code = {};         ///< Cells of a grid with this value.
@@ -180,6 +182,27 @@ struct Series {
   bool isStepped = false;              ///< The value holds over the interval that ends at its time.
   std::vector<double> positions = {};  ///< In the place of times, for a chart over numbers (`SeriesContent::numbers`).
   int panel = 0;                       ///< Which of several charts below each other, from 0.
+  /// The number of its colour, where it is not that of its place among the series.
+  std::optional<std::size_t> color = {};
+};
+
+/// A series of a file that a user may lay over those of a chart.
+struct SeriesOffer {
+  std::string name;
+  std::string group;  ///< What it is one of: "In the same file".
+  std::string path;
+  int item = 1;
+
+  bool IsSame(const SeriesOffer& other) const { return path == other.path && item == other.item; }
+};
+
+/// What a user may lay over the series of a chart. It outlives the chart that shows it.
+struct SeriesChoice {
+  std::function<std::vector<SeriesOffer>()> offers;
+  std::function<bool(const SeriesOffer& offer)> isShown;
+  std::function<void(const SeriesOffer& offer, bool shown)> show;
+  /// Asks for a series of any other file; false when the user gave up.
+  std::function<bool(Host& host)> addFile;
 };
 
 /// A stretch of time in a strip above the curves: what was going on meanwhile.
@@ -230,6 +253,7 @@ struct SeriesContent {
   std::vector<DateMarker> markers = {};
   std::optional<DateRequest> request = {};
   std::vector<TimeBar> bars = {};  ///< Ascending by their start.
+  std::optional<SeriesChoice> choice = {};
 
   bool IsEmpty() const { return series.empty(); }
 };

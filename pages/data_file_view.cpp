@@ -71,6 +71,14 @@ void DataFileView::Choose(std::vector<int> numbers) {
     return numbers.size() > 1 && Items()[static_cast<std::size_t>(number - 1)].dimensions != 0;
   });
   chosen_ = std::move(numbers);
+  // A series keeps its colour while others come and go.
+  std::erase_if(colors_,
+                [this](const auto& color) { return std::ranges::find(chosen_, color.first) == chosen_.end(); });
+  for (const int number : chosen_) {
+    std::size_t color = 0;
+    while (std::ranges::any_of(colors_, [color](const auto& taken) { return taken.second == color; })) ++color;
+    colors_.emplace(number, color);
+  }
   ChooseSlice(slice_);
 }
 
@@ -141,6 +149,7 @@ SeriesContent DataFileView::Chart() const {
     file.File = FileName(path_, {});
     file.Items = {number};
     SeriesContent one = FileChart(file);
+    for (Series& series : one.series) series.color = colors_.at(number);
     std::ranges::move(one.series, std::back_inserter(chart.series));
     std::ranges::move(one.awaited, std::back_inserter(chart.awaited));
     if (!one.message.empty()) chart.message = one.message;

@@ -7,6 +7,7 @@
 #include <cstddef>
 #include <deque>
 #include <functional>
+#include <map>
 #include <memory>
 #include <optional>
 #include <string>
@@ -111,7 +112,8 @@ class DataFileView {
   DataFile file_;
   std::string problem_;
   std::vector<int> chosen_;
-  std::vector<int> series_;  ///< The numbers of all series.
+  std::vector<int> series_;            ///< The numbers of all series.
+  std::map<int, std::size_t> colors_;  ///< Of the series that are chosen, by their numbers.
   GridSlice slice_;
   std::size_t firstRow_ = 0;
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid_;  ///< The one that is shown; null until it is read.

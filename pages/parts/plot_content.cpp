@@ -130,13 +130,6 @@ std::shared_ptr<Computed<CTvnShapeData>> RecentOutline(const std::string& path, 
                       });
 }
 
-std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item) {
-  static RecentFiles<FileKey, Series> files;
-  return files.Get({path, {StampOf(path)}, item, {}, {}}, path, [path, item](Series& series, ProgressPart progress) {
-    return ReadSeries(path, item, series, progress);
-  });
-}
-
 /// Grids, shapes and rivers of a list of layers that are shown.
 void AddLayers(const COverlayListKvf& list, MapContent& map) {
   for (int number = 1; number <= list.GetItemCount(); ++number) {
@@ -237,6 +230,13 @@ MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit) {
     map.message = shapes->Problem();
   }
   return map;
+}
+
+std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item) {
+  static RecentFiles<FileKey, Series> files;
+  return files.Get({path, {StampOf(path)}, item, {}, {}}, path, [path, item](Series& series, ProgressPart progress) {
+    return ReadSeries(path, item, series, progress);
+  });
 }
 
 SeriesContent FileChart(const DataFileNode& node) {

@@ -32,6 +32,9 @@ void AddDomainOutline(const CYbSEKvfBase& node, MapContent& map);
 /// A chart of the selected item of a file of series, with the simulation's period.
 SeriesContent FileChart(const DataFileNode& file);
 
+/// The values of a series of a file over time.
+std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item);
+
 /// The unit of an item's values in short, "mm/day"; as the file says it where it is none of ours.
 std::string ShortUnitOf(const DataItem& item);
 

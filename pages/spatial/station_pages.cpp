@@ -4,6 +4,7 @@
 
 #include <fmt/format.h>
 
+#include "pages/parts/further_series.h"
 #include "pages/parts/plot_content.h"
 #include "pages/parts/series_controls.h"
 #include "pages/parts/zone_controls.h"
@@ -23,13 +24,35 @@ struct ValueOrSeries {
   std::vector<int> itemTypes, valueTypes;
 };
 
-/// The controls of a value or a series; `isShown` says whether this form of the data is in force.
-void DescribeValueOrSeries(PageForm& form, CYbSEDlgBase& page, ValueOrSeries data, const Condition& isShown = {}) {
+/// The controls of a value or a series; `isShown` says whether this form of the data is in force. `others` tells what
+/// else may be laid over its chart.
+void DescribeValueOrSeries(PageForm& form, CYbSEDlgBase& page, ValueOrSeries data, const Condition& isShown = {},
+                           std::function<std::vector<NamedFile>()> others = {}) {
   const Condition isConstant = isShown && Is(data.type, 0), isSeries = isShown && Is(data.type, 1);
   form.Number("Value:", data.value).ShownWhen(isConstant);
   DescribeSeriesFile(form, page, "Time Series File:", data.file, {data.value, data.itemTypes, data.valueTypes},
                      isSeries);
-  form.Chart([&file = data.file] { return FileChart(file); }).ShownWhen(isSeries);
+  const auto further = std::make_shared<FurtherSeries>([&file = data.file, others = std::move(others)] {
+    return OffersBeside(file, "Other stations", others ? others() : std::vector<NamedFile>());
+  });
+  form.Chart([&file = data.file, further] {
+        SeriesContent chart = FileChart(file);
+        further->AddTo(chart);
+        return chart;
+      })
+      .ShownWhen(isSeries);
+}
+
+/// The series of all stations beside one.
+std::vector<NamedFile> FilesOfOthers(const C2DStationBasedDataTimeSeriesKvf& station) {
+  std::vector<NamedFile> files;
+  const CYbSEKvfBase* owner = station.GetParent();
+  for (const CYbSEKvfBase* child = owner->GetFirstChild(); child; child = owner->GetNextChild(child)) {
+    const auto* other = dynamic_cast<const C2DStationBasedDataTimeSeriesKvf*>(child);
+    if (other && other != &station && other->TYPE == C2DStationBasedDataTimeSeriesKvf::kTimeVarying)
+      files.push_back({other->GetStationName(), &other->SeriesFile()});
+  }
+  return files;
 }
 
 constexpr ZoneSourceWords kStationWords{.grid = "Station Based Distribution File:",
@@ -99,7 +122,8 @@ void DescribeStation(PageForm& form, C2DStationBasedDataTimeSeriesKvf& n, CYbSED
   ZoneIdentity(form, "areas", n, data ? &data->Stations() : nullptr);
   if (!data) return;
   DescribeValueOrSeries(form, page,
-                        {n.TYPE, n.FIXED_VALUE, n.SeriesFile(), data->Kind().itemTypes, data->Kind().valueTypes});
+                        {n.TYPE, n.FIXED_VALUE, n.SeriesFile(), data->Kind().itemTypes, data->Kind().valueTypes}, {},
+                        [&n] { return FilesOfOthers(n); });
   if (data->HasElevation()) form.Number("Elevation:", n.Elevation).ShownWhen(data->Kind().correctedWhen);
   form.Map([&n, data] { return ForcingMap(*data, &n); });
 }

@@ -7,6 +7,7 @@
 #include <optional>
 
 #include "pages/parts/create_dialogs.h"
+#include "pages/parts/further_series.h"
 #include "pages/parts/plot_content.h"
 #include "pages/parts/series_controls.h"
 #include "pages/parts/zone_controls.h"
@@ -74,7 +75,21 @@ void ChangeParameters(const CYbSEDlgBase& page, CVegetationKvf& n) {
 
 // ---- How vegetation develops, of the whole model or of one station
 
-void DescribeCourse(PageForm& form, const CYbSEDlgBase& page, VegetationCourse& course) {
+/// The series of the stations beside one; of all where it stands for the whole model.
+std::vector<NamedFile> FilesOfOthers(const VegetationCourse& course, const CYbSEKvfBase& owner) {
+  std::vector<NamedFile> files;
+  for (const CYbSEKvfBase* child = owner.GetFirstChild(); child; child = owner.GetNextChild(child)) {
+    const auto* other = dynamic_cast<const VegetationCourse*>(child);
+    const auto* station = dynamic_cast<const CodedZoneProp*>(child);
+    if (!other || other == &course || !station || !other->IsOfForm(VegetationCourse::kTimeVarying).Holds(*child))
+      continue;
+    files.push_back({station->GetStationName() + " LAI", &other->LaiFile()});
+    files.push_back({station->GetStationName() + " RD", &other->RootDepthFile()});
+  }
+  return files;
+}
+
+void DescribeCourse(PageForm& form, const CYbSEDlgBase& page, VegetationCourse& course, const CYbSEKvfBase& owner) {
   const Condition isConstant = course.IsOfForm(VegetationCourse::kConstant),
                   isOverTime = course.IsOfForm(VegetationCourse::kTimeVarying);
   form.Number("LAI Constant Value:", course.FIXED_VALUE_LAI).ShownWhen(isConstant);
@@ -83,7 +98,14 @@ void DescribeCourse(PageForm& form, const CYbSEDlgBase& page, VegetationCourse& 
                      {course.FIXED_VALUE_LAI, {quantity::kLeafAreaIndex}, {}, "LAI"}, isOverTime);
   DescribeSeriesFile(form, page, "RD Timeseries File:", course.RootDepthFile(),
                      {course.FIXED_VALUE_RD, {quantity::kRootDepth}, {}, "RD"}, isOverTime);
-  form.Chart([&course] { return SeriesChart(course); }).ShownWhen(isOverTime);
+  const auto further = std::make_shared<FurtherSeries>(
+      [&course, &owner] { return OffersBeside(course.LaiFile(), "Other stations", FilesOfOthers(course, owner)); });
+  form.Chart([&course, further] {
+        SeriesContent chart = SeriesChart(course);
+        further->AddTo(chart);
+        return chart;
+      })
+      .ShownWhen(isOverTime);
 }
 
 constexpr ZoneSourceWords kStationWords{.grid = "Station Based Distribution File:",
@@ -122,7 +144,7 @@ void CVegetationDlg::Describe(PageForm& form) {
     return SyncWithSource(Outside(), Node().Stations());
   });
   form.Choice("Temporal Distribution:", fully.TYPE).ShownWhen(isByCells);
-  DescribeCourse(form, *this, n.Global());
+  DescribeCourse(form, *this, n.Global(), n);
   crops_.Describe(form, "Crop development:", isCrops);
   DescribeZoneSource(form, *this, n.Stations(), kStationWords);
   form.Map([this] {
@@ -158,7 +180,7 @@ void CVegetationTimeSeriesDlg::Describe(PageForm& form) {
   ZoneName(form, "Station ID:", n);
   form.Choice("Temporal Distribution:", n.TYPE);
   ZoneIdentity(form, "areas", n, owner ? &owner->Stations() : nullptr);
-  DescribeCourse(form, *this, n);
+  DescribeCourse(form, *this, n, owner ? static_cast<const CYbSEKvfBase&>(*owner) : n);
   crops_.Describe(form, "Crop Development:", n.IsOfForm(VegetationCourse::kCrops));
   if (owner) form.Map([&n, owner] { return ZoneMap(owner->Stations(), &n); });
 }

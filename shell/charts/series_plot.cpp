@@ -17,6 +17,7 @@
 #include "shell/charts/chart_markers.h"
 #include "shell/charts/chart_panels.h"
 #include "shell/charts/chart_style.h"
+#include "shell/charts/series_chooser.h"
 #include "shell/charts/time_bars.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -79,6 +80,9 @@ SeriesPlot::SeriesPlot(Host& host, QWidget* parent)
   message_->setBackgroundRole(QPalette::Base);
   Hold({chart_, [this](double factor) { Zoom(factor); }, [this] { Fit(); },
         [this](double pixelRatio) { return Picture(pixelRatio); }, [this] { return ValuesAsText(); }});
+  chooser_ = new SeriesChooser(host);
+  AddToRow(chooser_);
+  connect(chooser_, &SeriesChooser::Changed, this, &SeriesPlot::ShowChosen);
   views_ = new QActionGroup(this);
   const std::pair<SeriesView, QString> views[] = {{SeriesView::AsGiven, tr("As &given")},
                                                   {SeriesView::Cumulated, tr("C&umulated")},
@@ -110,6 +114,7 @@ QWidget* SeriesPlot::FocusTarget() const { return chart_; }
 
 void SeriesPlot::Show(SeriesContent content) {
   std::optional<DateRequest> request = std::exchange(content.request, {});
+  chooser_->SetChoice(std::exchange(content.choice, {}));
   if (isShown_ && LooksSame(content, given_)) {
     markers_->SetMoves(content.markers);
   } else {
@@ -122,7 +127,15 @@ void SeriesPlot::Show(SeriesContent content) {
   markers_->Ask(content_.IsEmpty() ? std::nullopt : std::move(request));
 }
 
+void SeriesPlot::ShowChosen() {
+  const bool wasEmpty = content_.IsEmpty();
+  const QCPRange seen = panels_->Keys().range();
+  ShowWhenThere(source_);
+  if (!wasEmpty && !content_.IsEmpty()) panels_->Keys().setRange(seen);
+}
+
 void SeriesPlot::ShowWhenThere(const std::function<SeriesContent()>& content) {
+  source_ = content;
   SeriesContent now = Follow<SeriesContent>(content, [this, content] { ShowWhenThere(content); });
   if (!now.awaited.empty() && isShown_) return;
   // Nothing is said of an empty chart that is still to come.
@@ -282,7 +295,7 @@ void SeriesPlot::ApplyTheme() {
   const QPalette colors = QApplication::palette();
   const QColor quiet = theme.QuietColor();
   for (std::size_t i = 0; i < curves_.size(); ++i) {
-    const QColor color = CurveColor(i, theme.IsDark());
+    const QColor color = CurveColor(curves_[i].series->color.value_or(i), theme.IsDark());
     // Wider pens are slow, and would join values that stand in neighbouring pixels.
     const bool isDense = curves_[i].graph->data()->size() > 5000;
     curves_[i].graph->setPen(QPen(color, isDense ? 1 : 1.4 * theme.Zoom()));

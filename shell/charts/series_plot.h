@@ -23,6 +23,7 @@ namespace tervane {
 
 class ChartMarkers;
 class ChartPanels;
+class SeriesChooser;
 class TimeBarPlottable;
 
 /// A chart of a page: curves over time or a number with their legend, also several charts below each other.
@@ -59,6 +60,8 @@ class SeriesPlot : public PlotFrame {
   void SetView(SeriesView view);
   SeriesContent InView() const;
   void Build();
+  /// Shows what the user has laid over the chart; the time that he looks at stays.
+  void ShowChosen();
   /// One of the charts below each other.
   void BuildPanel(int panel);
   /// The strip above the charts, with the bars.
@@ -79,6 +82,8 @@ class SeriesPlot : public PlotFrame {
   SeriesContent given_, content_;  ///< As the page tells it, and as it is shown.
   SeriesView view_ = SeriesView::AsGiven;
   QActionGroup* views_;
+  SeriesChooser* chooser_;
+  std::function<SeriesContent()> source_;  ///< Which is asked again when the user has chosen further series.
   bool isShown_ = false;
   QCustomPlot* chart_;
   QLabel* message_;

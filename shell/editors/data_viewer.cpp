@@ -34,7 +34,7 @@ constexpr int kDiskInterval = 2000;  ///< Milliseconds between looks at the file
 }  // namespace
 
 DataViewer::DataViewer(const std::string& path, Host& host, const DisplayUnits& units)
-    : file_(path, &units), units_(units), shownUnits_(units) {
+    : file_(path, &units), further_([] { return std::vector<SeriesOffer>(); }), units_(units), shownUnits_(units) {
   map_ = new MapView(host);
   chart_ = new SeriesPlot(host);
   table_ = new DataTable(file_);
@@ -239,7 +239,11 @@ void DataViewer::ShowItem() {
   table_->Reset();
   if (isSeries) {
     map_->StopWaiting();
-    chart_->ShowWhenThere([this] { return file_.Chart(); });
+    chart_->ShowWhenThere([this] {
+      SeriesContent chart = file_.Chart();
+      further_.AddTo(chart);
+      return chart;
+    });
     table_->GoTo(0, file_.ColumnOf(file_.Chosen().front()));
   } else {
     chart_->StopWaiting();

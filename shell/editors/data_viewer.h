@@ -9,6 +9,7 @@
 
 #include "core/host.h"
 #include "pages/data_file_view.h"
+#include "pages/parts/further_series.h"
 #include "platform/units.h"
 
 class QComboBox;
@@ -61,6 +62,7 @@ class DataViewer : public QWidget {
   void ShowNotes(const QString& text);
 
   DataFileView file_;
+  FurtherSeries further_;
   const DisplayUnits& units_;
   DisplayUnits shownUnits_;
   QStackedWidget* whole_;

@@ -81,6 +81,23 @@ TEST(DataFileView, ShowsSeriesAsRowsOfTimesWithUnitsInTheHeads) {
   EXPECT_THAT(view.FindDate("soon", step), HasSubstr("2000/01/31"));
 }
 
+TEST(DataFileView, ASeriesKeepsItsColourWhileOthersComeAndGo) {
+  const TempFolder folder;
+  WriteSeries(folder.File("gauge.nds0"), 1);
+  DataFileView view(folder.File("gauge.nds0"), nullptr);
+  const auto colors = [&view](std::vector<int> numbers) {
+    view.Choose(std::move(numbers));
+    std::vector<std::size_t> all;
+    for (const Series& series : Finished<SeriesContent>([&view] { return view.Chart(); }).series)
+      all.push_back(series.color.value());
+    return all;
+  };
+  EXPECT_THAT(colors({1}), testing::ElementsAre(0));
+  EXPECT_THAT(colors({2, 1}), testing::ElementsAre(1, 0));
+  EXPECT_THAT(colors({2}), testing::ElementsAre(1));
+  EXPECT_THAT(colors({1, 2}), testing::ElementsAre(0, 1));
+}
+
 TEST(DataFileView, ShowsTheChosenStepAndLayerOfAGridTheNorthFirst) {
   const TempFolder folder;
   WriteGrid(folder.File("a.nds3"));

@@ -2,13 +2,18 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/charts/series_plot.h"
 
+#include <QLineEdit>
+#include <QListWidget>
 #include <QTest>
+#include <algorithm>
 #include <cmath>
 #include <limits>
 
 #include <gmock/gmock.h>
 #include <qcustomplot.h>
 
+#include "shell/charts/chart_style.h"
+#include "shell/charts/series_chooser.h"
 #include "tests/shell/plot_events.h"
 
 namespace tervane {
@@ -62,6 +67,52 @@ TEST(SeriesPlot, TheValuesUnderThePointerAreToldAndAStepHoldsBeforeItsTime) {
   EXPECT_EQ(chart.Plot().ValuesAsText().toStdString(),
             "Time\tRain [mm]\tLevel [m]\n2000-01-01 00:00:00\t0\t1\n2000-01-02 00:00:00\t5\t2\n"
             "2000-01-03 00:00:00\t\t3\n2000-01-04 00:00:00\t7\t4\n2000-01-05 00:00:00\t1\t5\n");
+}
+
+TEST(SeriesPlot, TheListOfFurtherSeriesIsSearchedAndWhatIsCheckedIsLaidOverTheChart) {
+  std::vector<SeriesOffer> offers;
+  for (int i = 0; i < 30; ++i) offers.push_back({"Gauge " + std::to_string(i), i < 20 ? "Stations" : "File", "f", i});
+  std::vector<SeriesOffer> chosen;
+  const auto isShown = [&](const SeriesOffer& offer) {
+    return std::ranges::any_of(chosen, [&](const SeriesOffer& other) { return other.IsSame(offer); });
+  };
+  const auto content = [&] {
+    SeriesContent made;
+    made.series = {Daily("Rain", "mm", {0, 5, 3, 7, 1})};
+    for (const SeriesOffer& offer : chosen) {
+      made.series.push_back(Daily(offer.name, "mm", {1, 2, 3, 4, 5}));
+      made.series.back().color = 5;
+    }
+    made.choice = SeriesChoice{[&] { return offers; }, isShown,
+                               [&](const SeriesOffer& offer, bool shown) {
+                                 std::erase_if(chosen, [&](const SeriesOffer& other) { return other.IsSame(offer); });
+                                 if (shown) chosen.push_back(offer);
+                               },
+                               [](Host&) { return false; }};
+    return made;
+  };
+  ShownChart chart({});
+  auto* button = chart.Plot().findChild<SeriesChooser*>();
+  EXPECT_FALSE(button->isVisible());
+  chart.Plot().ShowWhenThere(content);
+  ASSERT_TRUE(button->isVisible());
+  chart.Plot().Zoom(4);
+  const QCPRange zoomed = chart.Chart().xAxis->range();
+  button->click();
+  auto* list = chart.Plot().findChild<QListWidget*>();
+  ASSERT_TRUE(list);
+  ASSERT_EQ(list->count(), 32) << "two heads";
+  QTest::keyClicks(chart.Plot().findChild<QLineEdit*>(), "gauge 25");
+  int visible = 0;
+  for (int row = 0; row < list->count(); ++row) visible += list->item(row)->isHidden() ? 0 : 1;
+  EXPECT_EQ(visible, 2);
+  list->findItems("Gauge 25", Qt::MatchExactly).front()->setCheckState(Qt::Checked);
+  ASSERT_EQ(chart.Chart().graphCount(), 2);
+  EXPECT_EQ(chart.Chart().graph(1)->name(), "Gauge 25 [mm]");
+  EXPECT_EQ(chart.Chart().graph(1)->pen().color(), CurveColor(5, false));
+  EXPECT_EQ(chart.Chart().xAxis->range(), zoomed) << "the time that is looked at stays";
+  list->findItems("Gauge 25", Qt::MatchExactly).front()->setCheckState(Qt::Unchecked);
+  EXPECT_EQ(chart.Chart().graphCount(), 1);
 }
 
 TEST(SeriesPlot, AGapIsEmptyAlsoAmongManyValues) {
