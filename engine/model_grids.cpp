@@ -80,7 +80,8 @@ bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, EngineOutput
     if (isCode)
       for (const float value : values)
         if (value != kDeleteValue) ++grid.cellsOfCode[static_cast<int>(std::lround(value))];
-    if (missing > 0) log.Warning(grid.place, fmt::format("{} cells of the domain have no {}", missing, grid.title));
+    if (missing > 0 && !grid.mayLeaveCells)
+      log.Warning(grid.place, fmt::format("{} cells of the domain have no {}", missing, grid.title));
     if (const std::string error = writer.Put(static_cast<int>(n) + 1, values); !error.empty()) {
       log.Error(grid.place, error);
       return false;

@@ -24,6 +24,7 @@ struct ModelGrid {
   /// Makes the values, in the item type's base unit, on any grid in the model's plane.
   std::function<FileResult(CTvn2DOrthoRotatedGridData&)> make;
   std::function<std::string(int code)> nameOfCode;  ///< Of the zones of a quantity of codes.
+  bool mayLeaveCells = false;                       ///< Cells without a value are worth no warning.
 
   // Known when the values were written.
   ValueSummary values;

@@ -234,7 +234,7 @@ void Preprocessor::ShowDomain(ReportPage& page) {
     return FileResult{};
   };
   const auto nameOfCode = [](int code) { return std::string(code == 2 ? "outer boundary" : "inside"); };
-  ShowGrid({page.title, PathOf(*catchment_), quantity::kCode, copy, nameOfCode, {}, {}}, page);
+  ShowGrid({page.title, PathOf(*catchment_), quantity::kCode, copy, nameOfCode, false, {}, {}}, page);
 
   CGeoDataBoundCondCatchmentData boundary;
   std::string problem = boundary.TakeValues(domain_->Geometry(), domain_->Values(), domain_->DeleteValue(),
@@ -262,7 +262,7 @@ void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
     }
     return BuildGrid(source, {}, grid);
   };
-  ShowGrid({page.title, PathOf(quantity), itemType, std::move(make), {}, {}, {}}, page);
+  ShowGrid({page.title, PathOf(quantity), itemType, std::move(make), {}, quantity.MayLeaveCells(), {}, {}}, page);
   if (&quantity != document_.Root().Important(kTopography)) return;
   report_.topographyFile = grids_.Path();
   report_.topographyItem = static_cast<int>(grids_.Grids().size());
@@ -270,14 +270,14 @@ void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
 
 void Preprocessor::ShowZones(CodedZonesKvf& zones, ReportPage& page) {
   if (zones.DistributionType == CodedZonesKvf::kUniform) return page.ShowText("One zone for the whole area.");
-  ShowZoneMap(zones, zones.CurrentSource(), page);
+  ShowZoneMap(zones, zones, page);
 }
 
 void Preprocessor::ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page) {
   const CGlobalKvf& global = forcing.Global();
   switch (forcing.DistributionType) {
     case C2DStationBasedDataKvf::kStationBased:
-      return ShowZoneMap(forcing, forcing.Stations().CurrentSource(), page);
+      return ShowZoneMap(forcing, forcing.Stations(), page);
     case C2DStationBasedDataKvf::kFullyDistributed:
       return ShowMeanGrid(forcing.FullyDistributed().GridFile(), forcing.GetItemType(), page);
     default:
@@ -292,13 +292,13 @@ void Preprocessor::ShowMeanGrid(const DataFileNode& file, int itemType, ReportPa
     return MeanOfSteps(path, item, start, end, grid);
   };
   page.title += ", mean of the time steps";
-  ShowGrid({page.title, PathOf(file), itemType, std::move(make), {}, {}, {}}, page);
+  ShowGrid({page.title, PathOf(file), itemType, std::move(make), {}, false, {}, {}}, page);
 }
 
 void Preprocessor::ShowVegetation(CVegetationKvf& vegetation, ReportPage& page) {
   switch (vegetation.DistributionType) {
     case CVegetationKvf::kStationBased:
-      return ShowZoneMap(vegetation, vegetation.Stations().CurrentSource(), page);
+      return ShowZoneMap(vegetation, vegetation.Stations(), page);
     case CVegetationKvf::kFullyDistributed: {
       const CVegetationFullyDistKvf& grids = vegetation.FullyDistributed();
       page.pages.resize(2);
@@ -336,9 +336,9 @@ void Preprocessor::ShowSeries(bool isConstant, float value, int itemType, const 
     page.ShowSeries(file.File.Absolute(), file.SelectedItem(), period_->GetSimStartDate(), period_->SIMEND);
 }
 
-void Preprocessor::ShowZoneMap(CFMSEKvfBase& owner, const GridSource& source, ReportPage& page) {
+void Preprocessor::ShowZoneMap(CFMSEKvfBase& owner, const CellValues& areas, ReportPage& page) {
   const auto table = std::make_shared<ZoneTable>();
-  auto make = [source, table](CTvn2DOrthoRotatedGridData& grid) {
+  auto make = [source = areas.CurrentSource(), table](CTvn2DOrthoRotatedGridData& grid) {
     if (source.type == CData2DKvf::kGridFile) return ReadGridData(source.file, source.item, grid);
     const PolygonFile polygons{source.file, source.attribute, source.gapFill, source.axisUnit};
     return grid.CreateGridData_GIS_Polygon(source.geometry, kUsualDeleteValue, polygons, *table);
@@ -351,7 +351,15 @@ void Preprocessor::ShowZoneMap(CFMSEKvfBase& owner, const GridSource& source, Re
       if (item->GetStationId() == id) return item->GetStationName();
     return id;
   };
-  ShowGrid({page.title, PathOf(owner), quantity::kCode, std::move(make), std::move(nameOfCode), {}, {}}, page);
+  ShowGrid({page.title,
+            PathOf(owner),
+            quantity::kCode,
+            std::move(make),
+            std::move(nameOfCode),
+            areas.MayLeaveCells(),
+            {},
+            {}},
+           page);
 }
 
 // ---- Summary

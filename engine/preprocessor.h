@@ -21,10 +21,10 @@ class CSimPeriodKvf;
 class CFMData0DFile;
 class CFMSEKvfBase;
 class CVegetationKvf;
+class CellValues;
 class CodedZonesKvf;
 class DataFileNode;
 class VegetationCourse;
-struct GridSource;
 
 /// Puts everything that varies over the model area on the cells of the model, and reports what it made as a tree of
 /// pages that mirrors the setup's. A kind of node is known here by its family alone, so that a new member of a family
@@ -57,8 +57,8 @@ class Preprocessor {
   void ShowCourse(const VegetationCourse& course, ReportPage& page);
   /// A constant as text, or a series.
   void ShowSeries(bool isConstant, float value, int itemType, const CFMData0DFile& file, ReportPage& page);
-  /// A map of the codes of zones or stations.
-  void ShowZoneMap(CFMSEKvfBase& owner, const GridSource& source, ReportPage& page);
+  /// A map of the codes of zones or stations, which `owner` bears.
+  void ShowZoneMap(CFMSEKvfBase& owner, const CellValues& areas, ReportPage& page);
   void ShowGrid(ModelGrid grid, ReportPage& page);
   /// The mean of the grids of a file over the simulation.
   void ShowMeanGrid(const DataFileNode& file, int itemType, ReportPage& page);

@@ -322,7 +322,7 @@ void CoverageBuilder::Conclude(CoverageRow& row) {
     add(Severity::Warning, fmt::format("No values from {} to {}", DateInWords(DateAt(row.gaps[i].start)),
                                        DateInWords(DateAt(row.gaps[i].end))));
   if (row.gaps.size() > kMostGaps) add(Severity::Warning, fmt::format("And {} gaps more", row.gaps.size() - kMostGaps));
-  if (row.missing > 0) add(Severity::Warning, MissingCellsText(row));
+  if (std::string missing = MissingCellsText(row); !missing.empty()) add(Severity::Warning, std::move(missing));
   std::ranges::stable_sort(row.remarks, {}, &Finding::severity);
   row.state = CoverageState::Fine;
   if (row.remarks.empty()) return;

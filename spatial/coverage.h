@@ -29,6 +29,7 @@ struct CoverageFile {
   std::string title;         ///< What it holds: "Topography", "Sion: Precipitation Rate".
   FileUse use;
   std::optional<GridSource> values;         ///< The quantity that is to have a value in every cell of the domain.
+  bool mayLeaveCells = false;               ///< Or in some of them.
   std::vector<Finding> findings;            ///< Of its node.
   std::shared_ptr<ComputedGrid> grid = {};  ///< Of the quantity, where its node keeps it.
 
@@ -83,7 +84,8 @@ struct CoverageRow {
   std::string PeriodText() const;
   /// "covers the simulation", "starts 31 days late; 2 gaps, 5 days"; empty where nothing is asked.
   std::string TimeText() const;
-  /// "covers the domain", "312 of 5285 cells have no value"; empty where nothing is asked.
+  /// "covers the domain", "312 of 5285 cells have no value", "covers 66 of 5285 cells" where that is enough; empty
+  /// where nothing is asked.
   std::string AreaText() const;
 };
 
@@ -128,7 +130,7 @@ struct CoverageBoard {
 FileResult ComputeCoverage(const CoverageRequest& request, const CoverageBoard* previous, CoverageBoard& board,
                            ProgressPart progress = {});
 
-/// "312 cells of the domain have no topography"; empty when all have one.
+/// "312 cells of the domain have no topography"; empty when all have one, or enough.
 std::string MissingCellsText(const CoverageRow& row);
 
 }  // namespace tervane

@@ -41,6 +41,7 @@ CoverageFile AskFile(const CYbSEKvfBase& node, const std::string& path, FileUse 
   if (auto* owner = dynamic_cast<CellValues*>(node.GetParent()); owner && use.isOverArea) {
     file.values = owner->CurrentSource();
     file.grid = owner->GridComputation();
+    file.mayLeaveCells = owner->MayLeaveCells();
   } else if (use.isOverArea && use.kind == FileUse::Kind::Data) {
     GridSource& source = file.values.emplace();
     source.type = CData2DKvf::kGridFile;

@@ -52,7 +52,7 @@ std::string ForcingTotals::ValueText(std::size_t column, std::size_t period, con
 }
 
 std::string MissingCellsText(const CoverageRow& row) {
-  if (row.missing == 0) return {};
+  if (row.missing == 0 || (row.file.mayLeaveCells && row.missing < row.cells)) return {};
   return fmt::format("{} of the domain {} no {}", row.missing == 1 ? "1 cell" : fmt::format("{} cells", row.missing),
                      row.missing == 1 ? "has" : "have", LowerCase(row.file.title));
 }
@@ -81,7 +81,9 @@ std::string CoverageRow::AreaText() const {
   if (isInDegrees) return "in degrees";
   if (cells == 0) return {};
   if (missing == cells) return "covers no cell of the domain";
-  return missing == 0 ? "covers the domain" : fmt::format("{} of {} cells have no value", missing, cells);
+  if (missing == 0) return "covers the domain";
+  return file.mayLeaveCells ? fmt::format("covers {} of {} cells", cells - missing, cells)
+                            : fmt::format("{} of {} cells have no value", missing, cells);
 }
 
 }  // namespace tervane

@@ -28,6 +28,7 @@ struct Data2DKind {
   float fixedValue = 0;  ///< The default.
   enum class RelativeToGround { Never, Off, On } relativeToGround = RelativeToGround::Never;  ///< On, Off: the default.
   bool mayBeScattered = true;  ///< Whether shape and XYZ files are offered.
+  bool mayLeaveCells = false;  ///< The quantity speaks of a part of the model; cells without a value are meant.
   std::string shortTitle = {};
 };
 
@@ -78,6 +79,7 @@ class CData2DKvf : public CTvnKvfBase, public CellValues {
   /// The building of the grid: another one when what decides the grid has changed; null for a uniform value and for a
   /// file that is not valid. It asks no node.
   std::shared_ptr<ComputedGrid> GridComputation() override;
+  bool MayLeaveCells() const override { return kind_.mayLeaveCells; }
   /// The grid, built here and now if it is not there yet; null for a uniform value and where it cannot be built, and
   /// then `problem` says why.
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> GetGridData(std::string* problem = nullptr);

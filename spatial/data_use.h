@@ -66,6 +66,8 @@ class CellValues {
   virtual GridSource CurrentSource() const = 0;
   /// The building of the grid, where the node keeps it for all who ask; else null.
   virtual std::shared_ptr<ComputedGrid> GridComputation() { return nullptr; }
+  /// Cells without a value are meant: the node speaks of a part of the model.
+  virtual bool MayLeaveCells() const { return false; }
 };
 
 /// A value that goes in a line from one time to another, in seconds since 1970-01-01.

@@ -29,6 +29,7 @@ struct ZoneSourceKind {
   int type = 0;                 ///< The default.
   bool hasGapFill = true;       ///< A zone may fill the cells outside all polygons.
   std::string_view countKey{};  ///< Of the number of zones; empty for a map of zones without properties.
+  bool mayLeaveCells = false;   ///< The zones are a part of the model; cells outside them are meant.
   bool hasGlobalZone = true;    ///< One zone serves the whole area where the source is not in force; else none is left.
   const char* noValues = FoundZones::kNoValuesInGrid;  ///< What a grid without any code is told with.
 };
@@ -61,6 +62,7 @@ class ZoneSource : public CellValues {
 
   /// Of the codes of the zones; nothing while the source is not in force.
   GridSource CurrentSource() const override;
+  bool MayLeaveCells() const override { return kind_.mayLeaveCells; }
   /// What the source holds; nothing is asked while it is not in force.
   FoundZones FindZones() const { return Finder()({}); }
   ZoneFinder Finder() const;

@@ -2,9 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "surface/irrigation.h"
 
+#include <fmt/format.h>
+
 #include "platform/item_types.h"
 #include "simspec/conditions.h"
 #include "simspec/river_branches.h"
+#include "spatial/stations.h"
 #include "surface/land_use.h"
 #include "surface/pages.h"
 
@@ -34,7 +37,8 @@ const Data2DKind kSheetArea{.className = "CIrrCommandAreas2DKvf",
                             .section = "INDIRECT_APPLICATION_AREA",
                             .title = "Sheet application area",
                             .itemType = quantity::kCode,
-                            .mayBeScattered = false};
+                            .mayBeScattered = false,
+                            .mayLeaveCells = true};
 
 // The name of these zones stands before their code.
 constexpr ZoneKey kAreaKeys[] = {
@@ -45,13 +49,13 @@ constexpr ZoneKey kDemandKeys[] = {
 constexpr CodedZonesKind kCommandAreas{.className = "CIrrCommandAreasKvf",
                                        .title = "Irrigation command areas",
                                        .section = "CommandAreas",
-                                       .source = {.hasGapFill = false, .countKey = "NO_AREAS"},
+                                       .source = {.hasGapFill = false, .countKey = "NO_AREAS", .mayLeaveCells = true},
                                        .makeZone = MakeZone<CIrrCommandAreasPropKvf>,
                                        .page = &kCommandAreasPage};
 constexpr CodedZonesKind kDemands{.className = "CIrrDemandKvf",
                                   .title = "Irrigation demand",
                                   .section = "Demands",
-                                  .source = {.countKey = "NO_DEMANDS"},
+                                  .source = {.countKey = "NO_DEMANDS", .mayLeaveCells = true},
                                   .makeZone = MakeZone<CIrrDemandPropKvf>,
                                   .page = &kDemandsPage};
 
@@ -60,7 +64,7 @@ constexpr KeyChoice kPrioritySources[] = {{ZoneSource::kGridCodes, "Grid codes (
 constexpr CodedZonesKind kPriorities{.className = "CIrrPrioritiesKvf",
                                      .title = "Irrigation priorities",
                                      .section = "Priorities",
-                                     .source = {.types = kPrioritySources, .hasGapFill = false},
+                                     .source = {.types = kPrioritySources, .hasGapFill = false, .mayLeaveCells = true},
                                      .makeZone = nullptr,
                                      .page = &kPrioritiesPage};
 
@@ -172,6 +176,24 @@ CIrrCommandAreasKvf::CIrrCommandAreasKvf(CYbSEKvfBase* parent) : CodedZonesKvf(k
   TakesPartWhen(Irrigates());
 }
 
+std::vector<Forcing> CIrrCommandAreasKvf::CurrentForcings() const {
+  Forcing licenses;
+  licenses.title = "License Limited Irrigation";
+  licenses.itemType = quantity::kWaterVolume;
+  for (const CFMSEKvfGroupBase* item : ZoneItems(*this)) {
+    const auto* area = dynamic_cast<const CIrrCommandAreasPropKvf*>(item);
+    if (!area) continue;
+    for (int number = 1; number <= area->Sources().GetItemCount(); ++number) {
+      const CIrrCommandAreasPropSourceItemKvf& source = *area->Sources().GetItem(number);
+      if (!source.LicenseFile().IsFileUsed()) continue;
+      ForcingSeries& series = licenses.series.emplace_back(ForcingSeriesOf(source.LicenseFile()));
+      series.name = fmt::format("{}, source {}", area->GetStationName(), number);
+    }
+  }
+  if (licenses.series.empty()) return {};
+  return {std::move(licenses)};
+}
+
 // ---- Demands
 
 namespace {
@@ -236,6 +258,26 @@ void CIrrDemandPropKvf::ExchangeKeys(KeyExchange& keys) {
 }
 
 CIrrDemandKvf::CIrrDemandKvf(CYbSEKvfBase* parent) : CodedZonesKvf(kDemands, parent) { TakesPartWhen(Irrigates()); }
+
+std::vector<Forcing> CIrrDemandKvf::CurrentForcings() const {
+  std::vector<Forcing> forcings;
+  for (const DemandValue& value : kDemandValues) {
+    Forcing forcing;
+    forcing.title = fmt::format("Irrigation: {}", value.chartTitle);
+    forcing.itemType = value.itemType;
+    for (const CFMSEKvfGroupBase* item : ZoneItems(*this)) {
+      const auto* zone = dynamic_cast<const CIrrDemandPropKvf*>(item);
+      if (!zone || zone->DemandType != value.demandType) continue;
+      // What the vegetation property file wants is known to the engine alone.
+      if (zone->TYPE != CIrrDemandPropKvf::kConstant && zone->TYPE != CIrrDemandPropKvf::kSeries) continue;
+      ForcingSeries& series = forcing.series.emplace_back(
+          ForcingSeriesOf(zone->TYPE == CIrrDemandPropKvf::kSeries, zone->*value.constant, zone->FileOf(value)));
+      series.name = zone->GetStationName();
+    }
+    if (!forcing.series.empty()) forcings.push_back(std::move(forcing));
+  }
+  return forcings;
+}
 
 // ---- Priorities
 

@@ -6,9 +6,11 @@
 
 #include <span>
 #include <string>
+#include <vector>
 
 #include "core/list.h"
 #include "spatial/data2d.h"
+#include "spatial/data_use.h"
 #include "spatial/zones.h"
 
 namespace tervane {
@@ -118,10 +120,12 @@ class CIrrCommandAreasPropKvf : public CodedZoneProp {
   CIrrCommandAreasPropSourceListKvf* sources_;
 };
 
-/// The areas that are watered.
-class CIrrCommandAreasKvf : public CodedZonesKvf {
+/// The areas that are watered. What drives the model over time is the licenses of their sources.
+class CIrrCommandAreasKvf : public CodedZonesKvf, public ForcingNode {
  public:
   explicit CIrrCommandAreasKvf(CYbSEKvfBase* parent);
+
+  std::vector<Forcing> CurrentForcings() const override;
 };
 
 // ---- Demands
@@ -173,9 +177,12 @@ class CIrrDemandPropKvf : public CodedZoneProp {
 };
 
 /// The zones of demand.
-class CIrrDemandKvf : public CodedZonesKvf {
+class CIrrDemandKvf : public CodedZonesKvf, public ForcingNode {
  public:
   explicit CIrrDemandKvf(CYbSEKvfBase* parent);
+
+  /// One for each kind of value that a zone asks for.
+  std::vector<Forcing> CurrentForcings() const override;
 };
 
 // ---- Priorities

@@ -14,6 +14,8 @@
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/stations.h"
+#include "surface/irrigation.h"
+#include "surface/land_use.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -119,6 +121,33 @@ TEST_F(Coverage, CountsTheCellsWithoutAValue) {
   const auto broken = Board();
   EXPECT_EQ(RowOf(*broken, "dem.txt").state, CoverageState::Error);
   EXPECT_THAT(RowOf(*broken, "dem.txt").problem, HasSubstr("dem.txt, line 2: y is \"x\""));
+}
+
+TEST_F(Coverage, ZonesThatSpeakOfAPartOfTheModelMayLeaveCells) {
+  auto& landUse = *document_.Root().Important(kLandUse);
+  landUse.Irrigation = 1;
+  auto& areas = *landUse.Child<CIrrCommandAreasKvf>();
+  areas.Type = CodedZonesKvf::kPolygons;
+  areas.ShapeFile().Choose(FileName("irrigated.shp", folder_.Path()), "CODE");
+  const struct {
+    double from, to;
+    std::size_t missing;
+    const char* text;
+    const char* warning;
+  } cases[] = {
+      {300, 900, 40, "covers 60 of 100 cells", ""},
+      {0, 1000, 0, "covers the domain", ""},
+      {900.1, 949, 100, "covers no cell of the domain", "100 cells of the domain have no irrigation command areas"},
+  };
+  for (const auto& c : cases) {
+    WritePolygons("irrigated.shp", {{c.from, c.to}});
+    const auto board = Board();
+    const CoverageRow& row = RowOf(*board, "irrigated.shp");
+    EXPECT_EQ(row.missing, c.missing);
+    EXPECT_EQ(row.AreaText(), c.text);
+    EXPECT_EQ(MissingCellsText(row), c.warning);
+    EXPECT_EQ(row.state == CoverageState::Warning, *c.warning != 0) << c.text;
+  }
 }
 
 TEST_F(Coverage, HoldsPeriodsAndGapsAgainstTheSimulation) {

@@ -9,6 +9,7 @@
 
 #include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
+#include "spatial/coverage.h"
 #include "surface/land_use.h"
 #include "tests/simspec/test_setup.h"
 #include "tests/support/split_at_arrow.h"
@@ -202,6 +203,40 @@ TEST(Irrigation, ADemandAsksForTheFilesOfItsKindAlone) {
                           "PondingDepthConstValue=0.5f",
                           kind, temporal));
   }
+}
+
+TEST(Irrigation, LicensesAndDemandsAreForcings) {
+  Irrigated irrigated("", "DemandName = \"Orchards\"\nDemandMoistureDeficitStartConst = 0.5f");
+  const auto told = [&] {
+    irrigated.setup.Root().Validate();
+    std::string text;
+    for (const CoverageForcing& asked : AskCoverage(irrigated.setup.Root()).forcings)
+      if (asked.path.starts_with("LandUse/") && asked.path != "LandUse/Vegetation") {
+        text += asked.forcing.title + ":";
+        for (const ForcingSeries& series : asked.forcing.series)
+          text += fmt::format(" [{}] {}", series.name,
+                              series.constant ? fmt::format("{}", static_cast<double>(*series.constant)) : series.path);
+        text += "\n";
+      }
+    return text;
+  };
+  EXPECT_EQ(told(), "Irrigation: Demand: [Orchards] 0\n");
+  irrigated.demand.DemandType = Demand::kMaxAllowedDeficit;
+  EXPECT_EQ(told(),
+            "Irrigation: Moisture Deficit Start: [Orchards] 0.5\nIrrigation: Moisture Deficit End: [Orchards] 0\n");
+  irrigated.demand.DemandType = Demand::kPondingDepth;
+  irrigated.demand.TYPE = Demand::kSeries;
+  irrigated.demand.GetDemandFile()->Choose(FileName("ponds.nds0", "/setups"));
+  EXPECT_EQ(told(), "Irrigation: Ponding Depth: [Orchards] /setups/ponds.nds0\n");
+  irrigated.demand.TYPE = Demand::kVegetationProperties;
+  EXPECT_EQ(told(), "");
+  irrigated.area.SetStationName("Plain");
+  Source& second = *irrigated.area.Sources().AddItem();
+  second.IrrigationLicenseIncluded = 1;
+  second.LicenseFile().Choose(FileName("cap.nds0", "/setups"));
+  EXPECT_EQ(told(), "License Limited Irrigation: [Plain, source 2] /setups/cap.nds0\n");
+  irrigated.landUse.Irrigation = 0;
+  EXPECT_EQ(told(), "");
 }
 
 TEST(Irrigation, PrioritiesKeepPolygonsThatAFileHoldsAndMakeNoZones) {
