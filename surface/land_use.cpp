@@ -28,6 +28,11 @@ bool CLandUseKvf::IsIrrigationPossible() const { return IrrigationPossible().Hol
 void CLandUseKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Irrigation", Irrigation);
   keys.FromOne("Priorities", Priorities).OneOf(kPrioritySchemes);
+  constexpr int kLastVersionWithPavedAreas = 13;
+  keys.Until(kLastVersionWithPavedAreas, "Paved", pavedAreas_.Paved);
+  keys.Until(kLastVersionWithPavedAreas, "PavedGradientCheck", pavedAreas_.PavedGradientCheck);
+  keys.Until(kLastVersionWithPavedAreas, "SpecifyMaxPavedStorageChangeRate",
+             pavedAreas_.SpecifyMaxPavedStorageChangeRate);
 }
 
 }  // namespace tervane

@@ -12,6 +12,13 @@ namespace tervane {
 /// How water is shared out among irrigated areas when there is too little.
 inline constexpr KeyChoice kPrioritySchemes[] = {{0, "None"}, {1, "Equal shortage"}, {2, "Equal volume"}};
 
+/// What setups written before version 14 say of paved areas here, and later ones at ponded drainage. Flags are 0 or 1.
+struct OldPavedAreas {
+  int Paved = 0;
+  int PavedGradientCheck = 0;
+  int SpecifyMaxPavedStorageChangeRate = 0;
+};
+
 /// The use of the land. Flags are 0 or 1.
 class CLandUseKvf : public CYbSEKvfBase {
  public:
@@ -22,9 +29,14 @@ class CLandUseKvf : public CYbSEKvfBase {
   int Priorities = kNoPriorities;
 
   bool IsIrrigationPossible() const;
+  /// As the setup that was read has them.
+  const OldPavedAreas& PavedAreas() const { return pavedAreas_; }
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  OldPavedAreas pavedAreas_;
 };
 inline constexpr ImportantName<CLandUseKvf> kLandUse{"LANDUSE"};
 

@@ -5,6 +5,7 @@
 #include "platform/item_types.h"
 #include "simspec/conditions.h"
 #include "simspec/control_parameters.h"
+#include "surface/land_use.h"
 #include "surface/pages.h"
 
 namespace tervane {
@@ -101,7 +102,7 @@ constexpr KeyChoice kDrainageOptions[] = {
 constexpr CodedZonesKind kPondedAreas{.className = "CPondedWaterExchangeKvf",
                                       .title = "Sub-areas for reduced ponded exchange",
                                       .section = "OnlyReducedContactInPonded",
-                                      .source = {.hasGapFill = false},
+                                      .source = {.hasGapFill = false, .mayLeaveCells = true},
                                       .makeZone = nullptr,
                                       .page = &kPondedWaterExchangePage};
 
@@ -111,13 +112,6 @@ constexpr CodedZonesKind kFlowZones{.className = "CTopographicalRoutingKvf",
                                     .source = {.countKey = "NO_ZONES"},
                                     .makeZone = MakeZone<CTopographicalRoutingPropKvf>,
                                     .page = &kOverlandZonesPage};
-
-/// A key of the old section; 0 where it is absent.
-int FlagOf(KvfNode* section, std::string_view key) {
-  int flag = 0;
-  if (section) kvfGetParam(section, key, &flag, 1, 1);
-  return flag;
-}
 
 }  // namespace
 
@@ -192,10 +186,12 @@ void COverlandKvf::LoadPavedAreas(KvfNode* landUse) {
     moved->UseOldSection = 1;
     moved->Load(landUse);
   }
-  Drainage = FlagOf(landUse, "Paved");
+  const auto* old = Important(kLandUse);
+  const OldPavedAreas flags = old ? old->PavedAreas() : OldPavedAreas{};
+  Drainage = flags.Paved;
   if (auto* drainage = Important(kPondedDrainage)) {
-    drainage->GradientCheck = FlagOf(landUse, "PavedGradientCheck");
-    drainage->SpecifyMaxStorageChangeRate = FlagOf(landUse, "SpecifyMaxPavedStorageChangeRate");
+    drainage->GradientCheck = flags.PavedGradientCheck;
+    drainage->SpecifyMaxStorageChangeRate = flags.SpecifyMaxPavedStorageChangeRate;
   }
 }
 

@@ -220,6 +220,11 @@ TEST(KeyReference, TellsInWhichVersionsAnOldKeyIsRead) {
   // Stations and zones are known though a new setup has none.
   EXPECT_EQ(find("Climate/PrecipitationRate/TIME_SERIES_%d", "Elevation").type, "float");
   EXPECT_EQ(find("Climate/SNOWMELTCONST", "Threshold").until, 10);
+  // Keys that another node takes over when an old setup is read.
+  for (const char* key : {"Paved", "PavedGradientCheck", "SpecifyMaxPavedStorageChangeRate"}) {
+    EXPECT_EQ(find("LandUse", key).until, 13) << key;
+    EXPECT_FALSE(find("LandUse", key).written) << key;
+  }
 }
 
 }  // namespace
