@@ -5,7 +5,6 @@
 #include <algorithm>
 #include <filesystem>
 #include <map>
-#include <sstream>
 
 #include <fmt/format.h>
 #include <gmock/gmock.h>
@@ -13,6 +12,7 @@
 #include <sys/stat.h>
 
 #include "document/setup_lock.h"
+#include "tests/support/command_outcome.h"
 #include "tests/support/preprocessed_run.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -23,6 +23,8 @@ namespace {
 using test::ReadFile;
 using test::SetupText;
 using test::TempFolder;
+using test::Tervane;
+using Outcome = test::CommandOutcome;
 using testing::AllOf;
 using testing::EndsWith;
 using testing::HasSubstr;
@@ -31,17 +33,6 @@ using testing::Not;
 using testing::StartsWith;
 
 using Arguments = std::vector<std::string>;
-
-struct Outcome {
-  int status;
-  std::string out, err;
-};
-
-Outcome Tervane(const Arguments& arguments) {
-  std::ostringstream out, err;
-  const int status = RunCommandLine(arguments, out, err);
-  return {status, out.str(), err.str()};
-}
 
 rapidjson::Document Json(const Outcome& outcome) {
   rapidjson::Document json;

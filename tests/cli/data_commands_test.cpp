@@ -1,17 +1,16 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <filesystem>
-#include <sstream>
 
 #include <gmock/gmock.h>
 #include <rapidjson/document.h>
 
-#include "cli/command_line.h"
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "geometry/cart.h"
 #include "platform/files.h"
 #include "platform/text.h"
+#include "tests/support/command_outcome.h"
 #include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
@@ -20,21 +19,12 @@ namespace {
 
 using test::ReadFile;
 using test::TempFolder;
+using test::Tervane;
+using Outcome = test::CommandOutcome;
 using testing::FloatEq;
 using testing::HasSubstr;
 using testing::Not;
 using testing::Pointwise;
-
-struct Outcome {
-  int status;
-  std::string out, err;
-};
-
-Outcome Tervane(const std::vector<std::string>& arguments) {
-  std::ostringstream out, err;
-  const int status = RunCommandLine(arguments, out, err);
-  return {status, out.str(), err.str()};
-}
 
 TEST(DataCommands, InfoAndStatsTellWhatAGridHolds) {
   const TempFolder folder;

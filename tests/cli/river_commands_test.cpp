@@ -2,13 +2,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "cli/river_commands.h"
 
-#include <sstream>
-
 #include <gmock/gmock.h>
 #include <rapidjson/document.h>
 
-#include "cli/command_line.h"
 #include "geometry/shapes.h"
+#include "tests/support/command_outcome.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {
@@ -16,17 +14,9 @@ namespace {
 
 using test::ReadFile;
 using test::TempFolder;
+using test::Tervane;
+using Outcome = test::CommandOutcome;
 using testing::HasSubstr;
-
-struct Outcome {
-  int status;
-  std::string out, err;
-};
-Outcome Tervane(const std::vector<std::string>& arguments) {
-  std::ostringstream out, err;
-  const int status = RunCommandLine(arguments, out, err);
-  return {status, out.str(), err.str()};
-}
 
 class RiverCommands : public testing::Test {
  public:
