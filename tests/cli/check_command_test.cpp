@@ -1,18 +1,20 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <map>
-#include <sstream>
 
 #include <gmock/gmock.h>
 #include <rapidjson/document.h>
 
-#include "cli/command_line.h"
 #include "data/grid_files.h"
 #include "document/flow_model_document.h"
 #include "geometry/grid_polygons.h"
+#include "simspec/river_branches.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
+#include "surface/crop_course.h"
+#include "surface/vegetation.h"
+#include "tests/support/command_outcome.h"
 
 namespace tervane {
 namespace {
@@ -24,13 +26,13 @@ TEST(CheckCommand, TheRhoneIsWhole) {
   ASSERT_EQ(ReadGridData(kFolder + "dem.tif", 1, heights).error, "");
   for (const char* name : {"rhone.tvd", "rhone_xyz.tvd"}) {
     SCOPED_TRACE(name);
-    std::ostringstream out, err;
     // One gauge is so near to others that no cell is its own.
-    EXPECT_EQ(RunCommandLine({"check", kFolder + name}, out, err), kFindings);
-    EXPECT_EQ(out.str(), kFolder + name +
-                             ": warning: Climate/PrecipitationRate/TIME_SERIES_31:GRIDCODEID: It gets no cell of the "
-                             "model: what it holds is used nowhere\n");
-    EXPECT_EQ(err.str(), "");
+    const test::CommandOutcome checked = test::Tervane({"check", kFolder + name});
+    EXPECT_EQ(checked.status, kFindings);
+    EXPECT_EQ(checked.out, kFolder + name +
+                               ": warning: Climate/PrecipitationRate/TIME_SERIES_31:GRIDCODEID: It gets no cell of the "
+                               "model: what it holds is used nowhere\n");
+    EXPECT_EQ(checked.err, "");
 
     CFlowModelDoc document;
     ASSERT_TRUE(document.OnOpenDocument(kFolder + name)) << document.Error();
@@ -74,15 +76,36 @@ TEST(CheckCommand, TheRhoneIsWhole) {
     for (const auto& [code, count] : cellsOfZone) EXPECT_NE(subcatchments->SelectZoneByCode(code), nullptr) << code;
     const SyncPlan plan = subcatchments->PlanZones(subcatchments->FindZones());
     EXPECT_TRUE(plan.added.empty() && plan.removed.empty());
+
+    // In each belt something grows at all times, and no crop takes the field of another one.
+    const auto& vegetation = *root.Important(kVegetation);
+    std::string covers;
+    for (const CFMSEKvfGroupBase* item : ZoneItems(vegetation)) {
+      const CropDevelopment crops = dynamic_cast<const CVegetationTimeSeriesKvf&>(*item).Crops().Development();
+      EXPECT_EQ(crops.problem, "");
+      covers += item->GetStationName() + ":";
+      for (const CropStretch& stretch : crops.stretches) {
+        EXPECT_EQ(stretch.kind, CropStretch::Kind::Crop) << item->GetStationName();
+        const std::string crop = " " + stretch.file->VegetationName();
+        if (!covers.ends_with(crop)) covers += crop;
+      }
+      covers += "\n";
+    }
+    EXPECT_EQ(covers,
+              "colline: Grass Maize Winter wheat Winter rape Grass\nmontane: Deciduous forest\n"
+              "subalpine: Coniferous forest\nalpine: Permanent pasture\nnival: Bare soil\n");
+    // The network is the one of the lines, with the sliver.
+    const RiverBranches rivers = RiverBranches::Of(root);
+    EXPECT_EQ(rivers.Reading().network.branches.size(), 4u);
+    EXPECT_TRUE(rivers.Reading().findings.empty());
   }
 }
 
 /// Runs a command; gives its status.
 int Tervane(const std::vector<std::string>& arguments, std::string& out) {
-  std::ostringstream results, messages;
-  const int status = RunCommandLine(arguments, results, messages);
-  out = results.str();
-  return status;
+  const test::CommandOutcome outcome = test::Tervane(arguments);
+  out = outcome.out;
+  return outcome.status;
 }
 
 TEST(CheckCommand, CoverageTellsHowTheDataFit) {
@@ -90,6 +113,7 @@ TEST(CheckCommand, CoverageTellsHowTheDataFit) {
   EXPECT_EQ(Tervane({"check", "--coverage", kFolder + "rhone_xyz.tvd"}, out), kDone) << out;
   EXPECT_THAT(out, testing::HasSubstr("simulation: 2012-01-01 to 2015-12-31\ndomain: 5285 of 142 x 97 cells"));
   EXPECT_THAT(out, testing::ContainsRegex("ok +Topography +dem.xyz.txt +13774 points +covers the domain"));
+  EXPECT_THAT(out, testing::ContainsRegex("ok +Irrigation command areas +irrigated.shp .*covers 66 of 5285 cells"));
   // Of the year 2013, area-weighted: what the stations' columns and their shares give.
   EXPECT_THAT(out, testing::ContainsRegex("  domain \\(100%\\) +[0-9.]+ +[0-9.]+ +[0-9.]+ +[0-9.]+ +[0-9.]+\n"));
 

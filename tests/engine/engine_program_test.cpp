@@ -188,8 +188,16 @@ TEST(EngineProgramExample, ReportsTheRhone) {
   const std::string report = test::ReadFile(folder.File("rhone_results/rhone_PreProcessed.kvf"));
   for (const char* expected : {"Model Domain and Grid: 5285 km2 in 5285 cells", "Topography: 374.216 m to 4292.8 m",
                                "Precipitation Rate: 5285 km2", "45, Gauge 45: ", "TITLE = \"Gauge 262\"",
-                               "Filename = file \"../temperature.nds0\"", "StartDate = 2012, 1, 1, 0, 0, 0"})
+                               "Filename = file \"../temperature.nds0\"", "StartDate = 2012, 1, 1, 0, 0, 0",
+                               "Vegetation: 5285 km2 in 5285 cells", "1, colline: 252 km2",
+                               "2013-08-29 to 2014-07-25: Winter rape", "Irrigation command areas: 66 km2 in 66 cells",
+                               "1, Rhone plain: 66 km2", "Manning Number: 1.25 m^(1/3)/s to 20 m^(1/3)/s"})
     EXPECT_THAT(report, HasSubstr(expected));
+  // Water is to get to a part of the model alone.
+  EXPECT_THAT(out.str(), testing::Not(HasSubstr("LandUse")));
+  CYbShapeData rivers;
+  ASSERT_TRUE(rivers.ReadShapeAndDbfFile(folder.File("rhone_results/rhone_PreProcessed_Rivers.shp"), "NAME").Ok());
+  EXPECT_EQ(rivers.GetData().size(), 4U);
 
   std::ostringstream faults;
   EXPECT_EQ(RunEngineProgram({folder.File("rhone_faults.tvd"), "/PP"}, faults), kEngineFailed);

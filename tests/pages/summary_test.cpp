@@ -31,7 +31,8 @@ TEST(Summary, TellsWhatTheSetupIsAboutAndWhatComesNext) {
   EXPECT_EQ(Shown(document, "Simulation:"), "2012-01-01 to 2015-12-31 (1460 days)");
   EXPECT_EQ(Shown(document, "Model domain:"), "142 x 97 cells of 1000 m, WGS 84 / UTM zone 32N");
   EXPECT_THAT(Shown(document, "Switched on:"), HasSubstr("Overland Flow (OL): Finite Difference"));
-  EXPECT_THAT(Shown(document, "Switched on:"), testing::Not(HasSubstr("Rivers")));
+  EXPECT_THAT(Shown(document, "Switched on:"), HasSubstr("Rivers and Lakes (OC)"));
+  EXPECT_THAT(Shown(document, "Switched on:"), testing::Not(HasSubstr("Water Quality")));
   EXPECT_EQ(Shown(document, "Findings:"), "1 warning");
   EXPECT_EQ(Shown(document, "Last run:"), "none yet");
   EXPECT_THAT(Shown(document, "Next step:"), HasSubstr("Run the preprocessor"));
