@@ -178,6 +178,7 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
     ShowQuantity(*quantity, page);
   } else if (auto* zones = dynamic_cast<CodedZonesKvf*>(&node)) {
     ShowZones(*zones, page);
+    if (const auto* driver = dynamic_cast<const ForcingNode*>(&node)) AddForcings(*driver, page);
   } else if (auto* forcing = dynamic_cast<C2DStationBasedDataKvf*>(&node)) {
     ShowForcing(*forcing, page);
   } else if (const auto* station = dynamic_cast<const C2DStationBasedDataTimeSeriesKvf*>(&node)) {
@@ -271,6 +272,19 @@ void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
 void Preprocessor::ShowZones(CodedZonesKvf& zones, ReportPage& page) {
   if (zones.DistributionType == CodedZonesKvf::kUniform) return page.ShowText("One zone for the whole area.");
   ShowZoneMap(zones, zones, page);
+}
+
+void Preprocessor::AddForcings(const ForcingNode& node, ReportPage& page) {
+  for (const Forcing& forcing : node.CurrentForcings()) {
+    for (const ForcingSeries& series : forcing.series) {
+      ReportPage& child = page.pages.emplace_back();
+      child.title = fmt::format("{}, {}", forcing.title, series.name);
+      if (series.constant)
+        child.ShowText(fmt::format("{}, constant", WithUnit(*series.constant, forcing.itemType)));
+      else
+        child.ShowSeries(series.path, series.item, period_->GetSimStartDate(), period_->SIMEND);
+    }
+  }
 }
 
 void Preprocessor::ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page) {

@@ -24,6 +24,7 @@ class CVegetationKvf;
 class CellValues;
 class CodedZonesKvf;
 class DataFileNode;
+class ForcingNode;
 class VegetationCourse;
 
 /// Puts everything that varies over the model area on the cells of the model, and reports what it made as a tree of
@@ -49,6 +50,8 @@ class Preprocessor {
   void ShowDomain(ReportPage& page);
   void ShowQuantity(CData2DKvf& quantity, ReportPage& page);
   void ShowZones(CodedZonesKvf& zones, ReportPage& page);
+  /// What zones want or may take over time, a page each.
+  void AddForcings(const ForcingNode& node, ReportPage& page);
   void ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page);
   /// The network as lines, which the river model moves the water along.
   void ShowRiver(const CYbSEKvfBase& node, ReportPage& page);

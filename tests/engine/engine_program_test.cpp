@@ -191,7 +191,8 @@ TEST(EngineProgramExample, ReportsTheRhone) {
                                "Filename = file \"../temperature.nds0\"", "StartDate = 2012, 1, 1, 0, 0, 0",
                                "Vegetation: 5285 km2 in 5285 cells", "1, colline: 252 km2",
                                "2013-08-29 to 2014-07-25: Winter rape", "Irrigation command areas: 66 km2 in 66 cells",
-                               "1, Rhone plain: 66 km2", "Manning Number: 1.25 m^(1/3)/s to 20 m^(1/3)/s"})
+                               "1, Rhone plain: 66 km2", "Irrigation: Moisture Deficit Start, Crops", "0.55, constant",
+                               "Manning Number: 1.25 m^(1/3)/s to 20 m^(1/3)/s"})
     EXPECT_THAT(report, HasSubstr(expected));
   // Water is to get to a part of the model alone.
   EXPECT_THAT(out.str(), testing::Not(HasSubstr("LandUse")));
