@@ -13,6 +13,7 @@
 namespace tervane {
 
 /// What the declarations tell of the keys that the controls of a page show: for tool tips, and to go back to a default.
+/// It knows controls by where they are, and so must not outlive them.
 class KeyDefaults {
  public:
   /// Forgets what the nodes held when they were last looked at; to be called when they may have changed.

@@ -23,7 +23,6 @@ Control& OfKey(PageDriver& page, std::string_view key) {
 
 TEST(KeyDefaults, GoBackToWhatTheDeclarationTells) {
   CFlowModelDoc document;
-  KeyDefaults defaults;
   const struct {
     const char *page, *control, *typed;
   } cases[] = {
@@ -38,6 +37,7 @@ TEST(KeyDefaults, GoBackToWhatTheDeclarationTells) {
   for (const auto& c : cases) {
     SCOPED_TRACE(c.control);
     PageDriver page(document, c.page);
+    KeyDefaults defaults;
     Control& control = OfKey(page, c.control);
     const std::string before = control.Text();
     defaults.Look();
