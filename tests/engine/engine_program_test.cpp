@@ -11,12 +11,15 @@
 #include "data/grid_files.h"
 #include "execution/execute_flags.h"
 #include "platform/item_types.h"
+#include "platform/units.h"
 #include "simspec/model_components.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
 #include "surface/climate.h"
+#include "surface/irrigation.h"
+#include "surface/land_use.h"
 #include "surface/overland.h"
 #include "surface/rivers.h"
 #include "surface/vegetation.h"
@@ -113,6 +116,43 @@ TEST_F(EngineProgram, TellsCellsWithoutValueAndZonesByName) {
   ASSERT_EQ(Run("/PP"), kEngineDone) << log;
   EXPECT_THAT(log, HasSubstr("warning: Subcatchments: 7 cells of the domain have no Subcatchments"));
   EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("8, Upper valley: 0.03 km2"));
+}
+
+TEST_F(EngineProgram, TellsWhereAndHowMuchIsIrrigated) {
+  WriteGrid("codes.nds2", {2, 4, 100, 1000, 2000, 0, {}}, {5, 5, 5, 5, 8, 8, 8, 8}, quantity::kCode);
+  NewDataFile content;
+  content.dimensions = 0;
+  content.items = {{"Cap", quantity::kWaterVolume, BaseUnit(*FindItemType(quantity::kWaterVolume)).key}};
+  DataFileWriter writer;
+  ASSERT_EQ(writer.Create(folder.File("cap.nds0"), content), "");
+  for (const CYbDateTime& day : {CYbDateTime(2000, 1, 1), CYbDateTime(2000, 3, 1)}) {
+    ASSERT_EQ(writer.AddStep(day), "");
+    ASSERT_EQ(writer.Put(1, std::vector{40.0F}), "");
+  }
+  ASSERT_EQ(writer.Finish().error, "");
+
+  auto& landUse = *document.Root().Important(kLandUse);
+  landUse.Irrigation = 1;
+  auto& areas = *landUse.Child<CIrrCommandAreasKvf>();
+  areas.GridFile().Choose(FileName("codes.nds2", folder.Path()));
+  ASSERT_EQ(areas.SyncZones(), kAdded);
+  auto& orchards = dynamic_cast<CIrrCommandAreasPropKvf&>(*areas.SelectZoneByCode(5));
+  orchards.SetStationName("Orchards");
+  CIrrCommandAreasPropSourceItemKvf& source = *orchards.Sources().GetItem(1);
+  source.SourceTypeCode = CIrrCommandAreasPropSourceItemKvf::kExternal;
+  source.IrrigationLicenseIncluded = 1;
+  source.LicenseFile().Choose(FileName("cap.nds0", folder.Path()));
+  landUse.Child<CIrrDemandKvf>()->DistributionType = CodedZonesKvf::kUniform;
+
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(log, Not(HasSubstr("have no Irrigation")));  // where no area is, nothing is watered
+  const std::string report = test::ReadFile(ReportPath());
+  for (const char* expected : {"Irrigation command areas: 0.07 km2 in 7 cells", "5, Orchards: 0.04 km2",
+                               "TITLE = \"License Limited Irrigation, Orchards, source 1\"", "file \"../cap.nds0\""})
+    EXPECT_THAT(report, HasSubstr(expected));
+  source.LicenseFile().Choose(FileName("away.nds0", folder.Path()));
+  EXPECT_EQ(Run("/PP"), kEngineFailed);
+  EXPECT_THAT(log, HasSubstr("Source1/TIME_SERIES_FILE:FILE_NAME: cannot read"));
 }
 
 TEST_F(EngineProgram, LeavesTheRiverNetworkAsLines) {
