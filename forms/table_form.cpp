@@ -31,6 +31,7 @@ TableColumn& TableForm::AddColumn(std::string head) {
 void TableForm::ClearColumns() {
   shown_.clear();
   columns_.clear();
+  sortedBy_ = nullptr;
 }
 
 void TableForm::ItemName(std::string one, std::string many) {
@@ -79,6 +80,7 @@ void TableForm::FollowCurrent() {
 void TableForm::Follow() {
   Forget();
   FollowColumns();
+  if (rows_->Refresh() || allRows_ == 0) Arrange();
   FollowCurrent();
 }
 

@@ -126,6 +126,20 @@ class TableForm {
   /// "Insert Row", "Move 3 Rows Up".
   std::string ActionName(RowAction action, int rows) const;
 
+  // Another order, or a part, of rows that can be arranged; nothing but what is seen changes.
+
+  bool CanArrange() const { return rows_->CanArrange(); }
+  /// By the values of a column: ascending, again descending, and then in their own order.
+  void SortBy(int column);
+  /// The column by whose values the rows stand, 0 for none, and whether they descend.
+  int SortedColumn() const;
+  bool IsDescending() const { return isDescending_; }
+  /// Only rows that hold a text in some cell, in any case; all for an empty one.
+  void Filter(std::string text);
+  const std::string& FilterText() const { return filter_; }
+  /// Also of those that are left out.
+  int AllRows() const { return allRows_; }
+
   // What a view asks for each cell that it draws: none costs more with more rows.
 
   /// The value of a cell as it is typed.
@@ -211,6 +225,7 @@ class TableForm {
   /// Puts the current row where its row went.
   void MoveCurrent(RowAction action, int first, int last);
   void Forget();
+  void Arrange();
   void FollowColumns();
   void FollowCurrent();
 
@@ -241,6 +256,10 @@ class TableForm {
   std::function<std::string(int)> rowHead_;
   std::function<void(int)> chosen_;
   bool reportsCurrent_ = false;
+  const TableColumn* sortedBy_ = nullptr;
+  bool isDescending_ = false;
+  std::string filter_;
+  int allRows_ = 0;
   int current_ = 0;
   const void* identity_ = nullptr;  ///< Of the current row.
 };

@@ -5,7 +5,10 @@
 #pragma once
 
 #include <concepts>
+#include <cstddef>
+#include <functional>
 #include <memory>
+#include <optional>
 #include <utility>
 #include <vector>
 
@@ -32,6 +35,13 @@ class TableRows {
   virtual void Delete(int /*row*/) {}
   virtual bool MoveUp(int /*row*/) { return false; }
   virtual bool MoveDown(int /*row*/) { return false; }
+
+  /// Whether the user may look at the rows in another order, or at some of them.
+  virtual bool CanArrange() const { return false; }
+  /// Asks anew which rows there are; true when they are others than before, and then all are there in their own order.
+  virtual bool Refresh() { return false; }
+  /// Of all rows in their own order those of these numbers are there, in the order of the numbers; nothing for all.
+  virtual void Arrange(const std::optional<std::vector<int>>& /*rows*/) {}
 };
 
 /// Rows of one class.
@@ -65,6 +75,38 @@ class ListRows : public RowsOf<Item> {
 
  private:
   CYbSEKvfAbstractListBase<Item>& list_;
+};
+
+/// Rows that stand elsewhere, which the user may look at in another order, or at some of them. They are kept as they
+/// were when the table was last brought in step.
+template <class Row>
+class ArrangedRows : public RowsOf<Row> {
+ public:
+  using Source = std::function<std::vector<Row*>()>;
+  explicit ArrangedRows(Source source) : source_(std::move(source)) { ArrangedRows::Refresh(); }
+
+  int Count() const override { return static_cast<int>(shown_.size()); }
+  Row& At(int row) const override { return *shown_[static_cast<std::size_t>(row - 1)]; }
+  const void* Identity(int row) const override { return shown_[static_cast<std::size_t>(row - 1)]; }
+  const CYbSEKvfBase* Node(int row) const override { return &At(row); }
+  bool CanArrange() const override { return true; }
+  bool Refresh() override {
+    std::vector<Row*> now = source_();
+    if (now == all_) return false;
+    all_ = std::move(now);
+    shown_ = all_;
+    return true;
+  }
+  void Arrange(const std::optional<std::vector<int>>& rows) override {
+    shown_ = all_;
+    if (!rows) return;
+    shown_.clear();
+    for (const int row : *rows) shown_.push_back(all_[static_cast<std::size_t>(row - 1)]);
+  }
+
+ private:
+  Source source_;
+  std::vector<Row*> all_, shown_;
 };
 
 /// Plain values, which outlive the table.

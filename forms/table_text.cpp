@@ -17,6 +17,7 @@ std::string HeadText(const TableForm& table, int number) {
   if (table.HeadSpan(number) > 1) text += fmt::format(" over {} columns", table.HeadSpan(number));
   if (column.kind == CellKind::Date) text += " date";
   if (column.IsButton()) text += " button";
+  if (!table.IsShownOnly() && !column.IsButton() && !column.set) text += " read only";
   if (column.IsButton() && !column.toolTip.empty()) text += fmt::format(" \"{}\"", column.toolTip);
   if (!column.choices.empty()) text += fmt::format(" of [{}]", fmt::join(column.choices.ShownTexts(), " | "));
   return text;
@@ -30,8 +31,14 @@ std::string CellInText(const TableForm& table, int row, int number) {
     text = fmt::format("[{}{}{}]", icon, icon.empty() || text.empty() ? "" : " ", text);
     return table.IsGrey(row, number) ? text + " (disabled)" : text;
   }
-  if (column.rowChoices) text += fmt::format(" of [{}]", fmt::join(table.Choices(row, number).ShownTexts(), " | "));
-  return table.IsGrey(row, number) ? text + (text.empty() ? "(read only)" : " (read only)") : text;
+  if (column.rowChoices) {
+    constexpr std::size_t kMostTold = 10;
+    const std::vector<std::string> choices = table.Choices(row, number).ShownTexts();
+    text += choices.size() > kMostTold ? fmt::format(" of {}", choices.size())
+                                       : fmt::format(" of [{}]", fmt::join(choices, " | "));
+  }
+  // The head tells of a column that takes nothing at all.
+  return column.set && table.IsGrey(row, number) ? text + (text.empty() ? "(read only)" : " (read only)") : text;
 }
 
 }  // namespace

@@ -75,7 +75,23 @@ std::vector<std::optional<float>> ValuesIn(const GridData& domain, const GridDat
   return values;
 }
 
-FileResult CountCells(const GridData& domain, const GridSource& areas, ProgressPart progress, AreaCells& cells) {
+namespace {
+
+/// The code of the area of each cell of the domain, nothing where there is none, and the identities of the codes.
+struct CodesOfCells {
+  std::vector<std::optional<float>> codes;
+  bool arePolygons = false;
+  std::map<int, std::string> idOfCode;  ///< Of polygons.
+
+  std::string IdOf(float value) const {
+    const int code = static_cast<int>(std::lround(value));
+    if (!arePolygons) return std::to_string(code);
+    const auto found = idOfCode.find(code);
+    return found == idOfCode.end() ? std::string() : found->second;
+  }
+};
+
+FileResult FindCodes(const GridData& domain, const GridSource& areas, ProgressPart progress, CodesOfCells& found) {
   GridData grid;
   ZoneTable zones;
   const bool isPolygons = areas.type == CData2DKvf::kShapeFile;
@@ -84,28 +100,53 @@ FileResult CountCells(const GridData& domain, const GridSource& areas, ProgressP
       isPolygons ? grid.CreateGridData_GIS_Polygon(areas.geometry, kUsualDeleteValue, polygons, zones, progress)
                  : ReadGridData(areas.file, areas.item, grid, progress);
   if (!result.Ok()) return result;
-  std::map<int, std::string> idOfCode;
-  for (const ZoneTable::Zone& zone : zones.zones) idOfCode[zone.code] = zone.text;
-  for (const std::optional<float>& value : ValuesIn(domain, grid)) {
-    if (!value) {
-      ++cells.withoutId;
-      continue;
-    }
-    const int code = static_cast<int>(std::lround(*value));
-    ++cells.cellsOfId[isPolygons ? idOfCode[code] : std::to_string(code)];
-  }
+  found.arePolygons = isPolygons;
+  for (const ZoneTable::Zone& zone : zones.zones) found.idOfCode[zone.code] = zone.text;
+  found.codes = ValuesIn(domain, grid);
   return result;
 }
 
-FileResult ComputeZoneAreas(const DomainSource& domain, const GridSource& zones, ProgressPart progress,
-                            ZoneAreas& areas) {
+void CountCodes(const CodesOfCells& found, AreaCells& cells) {
+  for (const std::optional<float>& code : found.codes) {
+    if (code)
+      ++cells.cellsOfId[found.IdOf(*code)];
+    else
+      ++cells.withoutId;
+  }
+}
+
+}  // namespace
+
+FileResult CountCells(const GridData& domain, const GridSource& areas, ProgressPart progress, AreaCells& cells) {
+  CodesOfCells found;
+  FileResult result = FindCodes(domain, areas, progress, found);
+  if (result.Ok()) CountCodes(found, cells);
+  return result;
+}
+
+FileResult ComputeZoneAreas(const DomainSource& domain, const GridSource& zones, const GridData* ground,
+                            ProgressPart progress, ZoneAreas& areas) {
   GridData grid;
   if (FileResult read = ReadDomain(domain, progress.Part(0, 0.5), grid); !read.Ok())
     return {"The model domain cannot be read: " + read.error, {}};
-  areas.cells = {};
+  areas = {};
   areas.allCells = CountInside(grid);
   areas.cellArea = grid.Geometry().cellSize * grid.Geometry().cellSize;
-  return CountCells(grid, zones, progress.Part(0.5, 1), areas.cells);
+  CodesOfCells found;
+  FileResult result = FindCodes(grid, zones, progress.Part(0.5, 1), found);
+  if (!result.Ok()) return result;
+  CountCodes(found, areas.cells);
+  if (!ground) return result;
+  std::map<std::string, std::pair<double, std::size_t>> sums;
+  const std::vector<std::optional<float>> elevations = ValuesIn(grid, *ground);
+  for (std::size_t cell = 0; cell < found.codes.size(); ++cell) {
+    if (!found.codes[cell] || !elevations[cell]) continue;
+    auto& [sum, count] = sums[found.IdOf(*found.codes[cell])];
+    sum += static_cast<double>(*elevations[cell]);
+    ++count;
+  }
+  for (const auto& [id, sum] : sums) areas.groundOfId[id] = sum.first / static_cast<double>(sum.second);
+  return result;
 }
 
 namespace {

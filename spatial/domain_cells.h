@@ -58,8 +58,12 @@ struct ZoneAreas {
   AreaCells cells;
   std::size_t allCells = 0;
   double cellArea = 0;  ///< Square metres.
+  /// The mean elevation of the ground in the cells of each area, in the unit of the ground; absent where none of them
+  /// has one.
+  std::map<std::string, double> groundOfId;
 };
-FileResult ComputeZoneAreas(const DomainSource& domain, const GridSource& zones, ProgressPart progress,
-                            ZoneAreas& areas);
+/// `ground` may be null.
+FileResult ComputeZoneAreas(const DomainSource& domain, const GridSource& zones,
+                            const CTvn2DOrthoRotatedGridData* ground, ProgressPart progress, ZoneAreas& areas);
 
 }  // namespace tervane

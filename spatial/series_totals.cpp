@@ -212,4 +212,28 @@ double TotalForm::Of(const PeriodSum& sum) const {
   return (isTotal ? sum.integral : sum.integral / static_cast<double>(sum.covered)) * factor;
 }
 
+FileResult ComputeMeans(const std::vector<SeriesOfFile>& series, const TimeSpan& span, ProgressPart progress,
+                        SeriesMeans& means) {
+  constexpr double kDay = 86400;
+  for (std::size_t i = 0; i < series.size(); ++i) {
+    const auto& [path, stamp, number] = series[i];
+    const double count = static_cast<double>(series.size());
+    const ProgressPart part = progress.Part(static_cast<double>(i) / count, static_cast<double>(i + 1) / count);
+    const auto facts = DataFileFactsOf(path);
+    if (number < 1 || number > static_cast<int>(facts->items.size()) || means.means.contains({path, number})) continue;
+    const DataItem& item = facts->items[static_cast<std::size_t>(number - 1)];
+    const SeriesFacts read = SumSeries(path, number, {span}, {}, part);
+    if (part.IsCancelled()) return {kCancelled, {}};
+    if (!read.error.empty() || read.sums.empty() || read.sums.front().covered <= 0) continue;
+    const TotalForm form = TotalFormOf(item.itemType, item.valueType);
+    SeriesMeans::Mean& mean = means.means[{path, number}];
+    mean.value = form.Of(read.sums.front());
+    mean.unit = form.unit;
+    if (!form.isTotal) continue;
+    mean.value *= kDay / static_cast<double>(read.sums.front().covered);
+    mean.unit += "/day";
+  }
+  return {};
+}
+
 }  // namespace tervane

@@ -7,9 +7,11 @@
 #include <cstdint>
 #include <functional>
 #include <limits>
+#include <map>
 #include <optional>
 #include <span>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "data/datafile.h"
@@ -76,5 +78,25 @@ struct TotalForm {
   double Of(const PeriodSum& sum) const;
 };
 TotalForm TotalFormOf(int itemType, ValueType valueType);
+
+/// A series of a file as it was read.
+struct SeriesOfFile {
+  std::string path;
+  FileStamp stamp;
+  int item = 1;
+
+  bool operator==(const SeriesOfFile&) const = default;
+};
+/// The means of series over a stretch of time, by file and item: of rates and amounts for each day. Absent where a
+/// series cannot be read or has no value in it.
+struct SeriesMeans {
+  struct Mean {
+    double value = 0;
+    std::string unit;
+  };
+  std::map<std::pair<std::string, int>, Mean> means;
+};
+FileResult ComputeMeans(const std::vector<SeriesOfFile>& series, const TimeSpan& span, ProgressPart progress,
+                        SeriesMeans& means);
 
 }  // namespace tervane

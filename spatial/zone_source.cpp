@@ -132,4 +132,10 @@ void CodedZoneProp::ReadData(KvfNode* section) {
   SetAbbreviatedTitle(NAME);
 }
 
+std::string_view CodedZoneProp::KeyOf(ZonePart part) const {
+  for (const ZoneKey& key : zoneKeys_)
+    if (key.part == part) return key.key;
+  return {};
+}
+
 }  // namespace tervane

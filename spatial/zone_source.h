@@ -135,6 +135,9 @@ class CodedZoneProp : public CFMSEKvfGroupBase {
   void SetStationId(const std::string& id) override { GRIDCODEID = id; }
   std::string GetStationId() const override { return GRIDCODEID; }
 
+  /// What a part of it is called in the file; empty where it has no such part.
+  std::string_view KeyOf(ZonePart part) const;
+
   void ReadData(KvfNode* section) override;
   /// Warns of a zone that gets no cell of the model: what it holds would be used nowhere.
   int ValidateData() override;

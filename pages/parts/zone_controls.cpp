@@ -207,7 +207,7 @@ void PlaceOfZone(PageForm& form, const CodedZoneProp& zone) {
 }
 
 void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words,
-                   ZoneAreaTable& areas) {
+                   TableOfZones& areas) {
   const auto sync = [&page, &zones] { return SyncWithSource(page.Outside(), zones); };
   if (zones.Kind().distribution) form.Choice("Spatial Distribution:", zones.DistributionType).Then(sync);
   Control& type = form.Choice("Data Type:", zones.Type).Then(sync);

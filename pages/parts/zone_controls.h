@@ -10,7 +10,7 @@
 #include "forms/page_rows.h"
 #include "forms/plots.h"
 #include "pages/parts/file_controls.h"
-#include "pages/parts/zone_area_table.h"
+#include "pages/parts/table_of_zones.h"
 #include "spatial/zones.h"
 
 namespace tervane {
@@ -55,7 +55,7 @@ void PlaceOfZone(PageForm& form, const CodedZoneProp& zone);
 
 /// All controls of a parent of zones.
 void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zones, const ZoneSourceWords& words,
-                   ZoneAreaTable& areas);
+                   TableOfZones& areas);
 
 /// The page of a parent of zones: `PageIs<ZonesPage<kWords>, CodedZonesKvf>(kPage)`.
 template <const ZoneSourceWords& words>
@@ -69,7 +69,7 @@ class ZonesPage : public PageOf<CodedZonesKvf> {
   void Describe(PageForm& form) override { DescribeZones(form, *this, Node(), words, areas_); }
 
  private:
-  ZoneAreaTable areas_{Node()};
+  TableOfZones areas_{Node()};
 };
 
 }  // namespace tervane

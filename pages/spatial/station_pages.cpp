@@ -7,6 +7,7 @@
 #include "pages/parts/further_series.h"
 #include "pages/parts/plot_content.h"
 #include "pages/parts/series_controls.h"
+#include "pages/parts/table_of_zones.h"
 #include "pages/parts/zone_controls.h"
 #include "spatial/pages.h"
 #include "spatial/stations.h"
@@ -68,6 +69,21 @@ MapContent ForcingMap(const C2DStationBasedDataKvf& data, const CFMSEKvfGroupBas
              : ZoneMap(data.Stations(), highlighted);
 }
 
+/// What the stations of a forcing have in the table of all.
+StationColumns ColumnsOf(const C2DStationBasedDataKvf& data) {
+  using Station = C2DStationBasedDataTimeSeriesKvf;
+  StationColumns columns;
+  columns.series = [](CodedZoneProp& zone) {
+    auto& station = static_cast<Station&>(zone);
+    return station.TYPE == Station::kTimeVarying ? &station.SeriesFile() : nullptr;
+  };
+  columns.itemType = data.GetItemType();
+  if (!data.HasElevation()) return columns;
+  columns.elevation = [](CodedZoneProp& zone) { return &static_cast<Station&>(zone).Elevation; };
+  columns.hasElevation = [&data] { return data.Kind().correctedWhen.Holds(data); };
+  return columns;
+}
+
 /// A forcing: uniform, by stations, or fully distributed.
 class C2DStationBasedDataDlg : public PageOf<C2DStationBasedDataKvf> {
  public:
@@ -77,6 +93,9 @@ class C2DStationBasedDataDlg : public PageOf<C2DStationBasedDataKvf> {
 
  protected:
   void Describe(PageForm& form) override;
+
+ private:
+  TableOfZones stations_{Node().Stations(), ColumnsOf(Node())};
 };
 
 void C2DStationBasedDataDlg::Describe(PageForm& form) {
@@ -107,9 +126,11 @@ void C2DStationBasedDataDlg::Describe(PageForm& form) {
       .ShownWhen(is(Node_::kFullyDistributed));
   form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().FullyDistributed().GridFile().File); })
       .ShownWhen(is(Node_::kFullyDistributed));
+  stations_.Describe(form, *this);
   form.Map([this] {
         MapContent map = ForcingMap(Node(), nullptr);
         GoToPickedZone(map, *this, Node().Stations());
+        if (stations_.Follow(map.awaited) && Context().syncSoon) Context().syncSoon();
         return map;
       })
       .ShownWhen(!is(Node_::kUniform));

@@ -10,6 +10,7 @@
 #include "pages/parts/further_series.h"
 #include "pages/parts/plot_content.h"
 #include "pages/parts/series_controls.h"
+#include "pages/parts/table_of_zones.h"
 #include "pages/parts/zone_controls.h"
 #include "pages/surface/crop_controls.h"
 #include "platform/item_types.h"
@@ -129,6 +130,7 @@ class CVegetationDlg : public PageOf<CVegetationKvf> {
 
  private:
   CropControls crops_{Node().Global().Crops(), *this};
+  TableOfZones stations_{Node().Stations()};
 };
 
 void CVegetationDlg::Describe(PageForm& form) {
@@ -147,8 +149,10 @@ void CVegetationDlg::Describe(PageForm& form) {
   DescribeCourse(form, *this, n.Global(), n);
   crops_.Describe(form, "Crop development:", isCrops);
   DescribeZoneSource(form, *this, n.Stations(), kStationWords);
+  stations_.Describe(form, *this);
   form.Map([this] {
         MapContent map = ZoneMap(Node().Stations(), nullptr);
+        if (stations_.Follow(map.awaited) && Context().syncSoon) Context().syncSoon();
         GoToPickedZone(map, *this, Node().Stations());
         return map;
       })

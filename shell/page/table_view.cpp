@@ -10,6 +10,7 @@
 #include <QHeaderView>
 #include <QKeyEvent>
 #include <QLabel>
+#include <QLineEdit>
 #include <QMenu>
 #include <QToolButton>
 #include <algorithm>
@@ -33,6 +34,7 @@ TableView::TableView(CYbSEDlgBase& page, Control& control) : page_(page), contro
   MakeView();
   MakeActions();
   ConnectView();
+  if (control_.table->CanArrange()) MakeFilter();
   SyncButtons();
 }
 
@@ -67,6 +69,38 @@ void TableView::MakeButtons() {
   bar->addSpacing(theme.Scaled(12));
   bar->addWidget(message_, 1);
   static_cast<QVBoxLayout*>(layout())->addLayout(bar);
+}
+
+void TableView::MakeFilter() {
+  filter_ = new QLineEdit;
+  filter_->setPlaceholderText(tr("Filter"));
+  filter_->setToolTip(tr("Shows the rows that hold this text; a click on a head sorts by its column"));
+  filter_->setAccessibleName(tr("Filter rows"));
+  filter_->setClearButtonEnabled(true);
+  filter_->setMaximumWidth(Theme::Get().Scaled(200));
+  static_cast<QHBoxLayout*>(layout()->itemAt(0)->layout())->insertWidget(0, filter_);
+  connect(filter_, &QLineEdit::textChanged, this, [this](const QString& typed) {
+    Commit();
+    control_.table->Filter(FromQt(typed));
+    Sync();
+  });
+  connect(view_->horizontalHeader(), &QHeaderView::sectionClicked, this, [this](int section) {
+    Commit();
+    control_.table->SortBy(section + 1);
+    Sync();
+  });
+}
+
+void TableView::ShowArrangement() {
+  if (!filter_) return;
+  const TableForm& table = *control_.table;
+  QHeaderView& head = *view_->horizontalHeader();
+  const int sorted = table.SortedColumn();
+  head.setSortIndicatorShown(sorted > 0);
+  if (sorted > 0) head.setSortIndicator(sorted - 1, table.IsDescending() ? Qt::DescendingOrder : Qt::AscendingOrder);
+  if (!table.FilterText().empty() || message_->text().isEmpty())
+    message_->setText(table.FilterText().empty() ? QString()
+                                                 : tr("%1 of %2").arg(table.RowCount()).arg(table.AllRows()));
 }
 
 void TableView::MakeView() {
@@ -161,6 +195,7 @@ void TableView::Sync() {
   if (!control_.table->IsShownOnly()) FollowCurrentRow();
   isSyncing_ = false;
   message_->clear();
+  ShowArrangement();
   SyncButtons();
 }
 

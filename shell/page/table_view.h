@@ -9,6 +9,7 @@
 #include "shell/page/table_model.h"
 
 class QLabel;
+class QLineEdit;
 class QToolButton;
 
 namespace tervane {
@@ -49,6 +50,9 @@ class TableView : public QWidget {
   /// First and last of the rows that are selected as a whole; zeros when there are none.
   std::pair<int, int> SelectedRows() const;
   void MakeButtons();
+  /// The field above rows that can be arranged; a click on a head then sorts by its column.
+  void MakeFilter();
+  void ShowArrangement();
   void MakeView();
   void ConnectView();
   void MakeActions();
@@ -74,6 +78,7 @@ class TableView : public QWidget {
   TableModel* model_;
   QTableView* view_;
   QLabel* message_;
+  QLineEdit* filter_ = nullptr;
   QToolButton *insert_, *delete_, *up_, *down_;
   bool areColumnsTheUsers_ = false;  ///< He has moved an edge: they stay as he has them.
   bool isFitting_ = false;

@@ -84,8 +84,14 @@ void PlotFrame::Hold(Plot plot) {
     panel_->Sync();
     // A page that was left is hidden first, and what it speaks of may be gone.
     isAgainDue_ = !isVisible();
-    if (isVisible()) again_();
+    if (isVisible()) AskAgain();
   });
+}
+
+void PlotFrame::AskAgain() {
+  // What is asked may await something else, and then takes another one's place while it still runs.
+  const std::function<void()> again = again_;
+  again();
 }
 
 bool PlotFrame::IsThereInAMoment(const Awaited& awaited, const std::function<void()>& again) {
@@ -104,7 +110,7 @@ void PlotFrame::StopWaiting() {
 
 void PlotFrame::showEvent(QShowEvent* event) {
   QWidget::showEvent(event);
-  if (std::exchange(isAgainDue_, false)) again_();
+  if (std::exchange(isAgainDue_, false)) AskAgain();
 }
 
 void PlotFrame::AddToRow(QWidget* tool) {

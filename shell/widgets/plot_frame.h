@@ -64,6 +64,8 @@ class PlotFrame : public QWidget {
   }
 
  private:
+  /// Asks again for what was awaited.
+  void AskAgain();
   bool IsThereInAMoment(const Awaited& awaited, const std::function<void()>& again);
   void ExportPicture();
   void ExportValues();

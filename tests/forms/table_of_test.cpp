@@ -43,14 +43,14 @@ class PlainTable : public testing::Test {
 TEST_F(PlainTable, TellsOfEveryKindOfCell) {
   EXPECT_THAT(
       FormText(page_.Form()),
-      HasSubstr(
-          "  \"Name\" | \"Start\" date | \"Length [days]\" | \"End\" date | \"Process\" of [Porosity | Bulk density] | "
-          "\"Species\" | \"X\" | \"\" button \"Select point in the plot\" | \"Incl. Obs. Data\" | "
-          "\"Observed Data File\" over 3 columns | \"\" button | \"\" button\n"
-          "  \"Sp\": Spring | 2000/01/01  00:00 | 30 | 2000/01/31  00:00 (read only) | Porosity |  of [Nitrate | "
-          "Oxygen] |  | [find] | 0 | (read only) | [...] | [Edit...] (disabled)\n"
-          "  \"Su\": Summer | 2000/01/01  00:00 | 121.667 | 2000/05/31  16:00 (read only) | Bulk density |  of [Sand | "
-          "Clay] | 1234567.89 | [find] | 1 | data/observed.nds0 | [...] | [Edit...]\n"));
+      HasSubstr("  \"Name\" | \"Start\" date | \"Length [days]\" | \"End\" date read only | \"Process\" of [Porosity | "
+                "Bulk density] | "
+                "\"Species\" | \"X\" | \"\" button \"Select point in the plot\" | \"Incl. Obs. Data\" | "
+                "\"Observed Data File\" over 3 columns | \"\" button | \"\" button\n"
+                "  \"Sp\": Spring | 2000/01/01  00:00 | 30 | 2000/01/31  00:00 | Porosity |  of [Nitrate | "
+                "Oxygen] |  | [find] | 0 | (read only) | [...] | [Edit...] (disabled)\n"
+                "  \"Su\": Summer | 2000/01/01  00:00 | 121.667 | 2000/05/31  16:00 | Bulk density |  of [Sand | "
+                "Clay] | 1234567.89 | [find] | 1 | data/observed.nds0 | [...] | [Edit...]\n"));
 }
 
 TEST_F(PlainTable, CellsTakeWhatTheyShowAndRefuseTheRest) {

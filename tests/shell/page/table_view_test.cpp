@@ -9,6 +9,7 @@
 #include <QHeaderView>
 #include <QTableView>
 #include <QToolButton>
+#include <algorithm>
 
 #include <gmock/gmock.h>
 
@@ -405,6 +406,37 @@ TEST(TableView, WhatIsOnlyShownHasLinksAndNothingToChange) {
   for (const QToolButton* button : table->findChildren<QToolButton*>()) EXPECT_FALSE(button->isVisible());
   QTest::mouseClick(view->viewport(), Qt::LeftButton, {}, view->visualRect(view->model()->index(0, 0)).center());
   EXPECT_TRUE(QTest::qWaitFor([&] { return setup.Frame().CurrentPath() == "Catchment"; }));
+}
+
+TEST(TableView, RowsOfAllStationsAreFilteredSortedAndOpened) {
+  test::OpenedSetup setup(test::Example{"rhone", "rhone.tvd"});
+  setup.GoTo("Climate/PrecipitationRate");
+  const auto tables = setup.Frame().findChildren<TableView*>();
+  const auto shown = std::ranges::find_if(tables, &TableView::isVisible);
+  ASSERT_NE(shown, tables.end());
+  TableView& table = **shown;
+  const auto& cells = *static_cast<QTableView*>(table.FocusTarget())->model();
+  const auto text = [&cells](int row, int column) { return FromQt(cells.index(row, column).data().toString()); };
+  ASSERT_EQ(cells.rowCount(), 50);
+  // The areas await the ground, the means the series.
+  EXPECT_TRUE(QTest::qWaitFor([&] { return !text(0, 5).empty() && !text(0, 8).empty(); }, 20000));
+  auto* filter = table.findChild<QLineEdit*>();
+  QTest::keyClicks(filter, "gauge 1");
+  EXPECT_LT(cells.rowCount(), 50);
+  EXPECT_TRUE(setup.Shows(QString("%1 of 50").arg(cells.rowCount())));
+  auto& head = *static_cast<QTableView*>(table.FocusTarget())->horizontalHeader();
+  const QPoint cellsHead(head.sectionViewportPosition(6) + 5, head.height() / 2);
+  for (const bool isDescending : {false, true}) {
+    QTest::mouseClick(head.viewport(), Qt::LeftButton, {}, cellsHead);
+    EXPECT_EQ(std::stoi(text(0, 6)) > std::stoi(text(1, 6)), isDescending);
+  }
+  const std::string first = text(0, 1);
+  filter->clear();
+  EXPECT_EQ(cells.rowCount(), 50);
+  QTest::keyClicks(filter, ToQt(first));
+  auto* view = static_cast<QTableView*>(table.FocusTarget());
+  QTest::mouseClick(view->viewport(), Qt::LeftButton, {}, view->visualRect(cells.index(0, 0)).center());
+  EXPECT_TRUE(QTest::qWaitFor([&] { return setup.Frame().CurrentPath().find("TIME_SERIES_") != std::string::npos; }));
 }
 
 }  // namespace
