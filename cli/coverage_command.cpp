@@ -76,11 +76,12 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
     fmt::print(out, "\n{}: {}; in brackets shares of domain and time\n", totals.forcing.path, totals.Heading());
     Rows table{{"station"}};
     for (const TotalsPeriod& period : board.periods) table.front().push_back(period.name);
+    const int decimals = totals.Decimals();
     for (std::size_t column = 0; column < totals.columns.size(); ++column) {
       auto& row = table.emplace_back();
       row.push_back(totals.ColumnText(column));
       for (std::size_t period = 0; period < board.periods.size(); ++period)
-        row.push_back(totals.ValueText(column, period, board.periods[period].span));
+        row.push_back(totals.ValueText(column, period, board.periods[period].span, decimals));
     }
     WriteTable(table, out);
     for (const ForcingTotals::Column& column : totals.columns)

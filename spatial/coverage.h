@@ -107,7 +107,9 @@ struct ForcingTotals {
   /// "Sion (12%)": with the share of the domain where it is known.
   std::string ColumnText(std::size_t column) const;
   /// "1106", "512 (56%)" with the share of the time that has values, or empty where nothing is known.
-  std::string ValueText(std::size_t column, std::size_t period, const TimeSpan& span) const;
+  std::string ValueText(std::size_t column, std::size_t period, const TimeSpan& span, int decimals) const;
+  /// With how many decimals all its values are told: five digits of the largest at most, and no more than they have.
+  int Decimals() const;
 };
 
 /// A period for which totals are made.

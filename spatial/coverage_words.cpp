@@ -1,5 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <algorithm>
 #include <cmath>
 
 #include <fmt/format.h>
@@ -42,10 +43,28 @@ std::string ForcingTotals::ColumnText(std::size_t column) const {
   return c.share ? fmt::format("{} ({:.0f}%)", c.name, *c.share * 100) : c.name;
 }
 
-std::string ForcingTotals::ValueText(std::size_t column, std::size_t period, const TimeSpan& span) const {
+int ForcingTotals::Decimals() const {
+  constexpr int kDigits = 5;
+  double largest = 0;
+  int needed = 0;
+  for (const Column& column : columns) {
+    for (const PeriodSum& sum : column.sums) {
+      const double value = std::abs(form.Of(sum));
+      if (!std::isfinite(value) || value <= 0) continue;
+      largest = std::max(largest, value);
+      const std::string text = FormatNumber(value, "%.5g");
+      if (const std::size_t point = text.find('.'); point != std::string::npos && text.find('e') == std::string::npos)
+        needed = std::max(needed, static_cast<int>(text.size() - point) - 1);
+    }
+  }
+  if (largest <= 0) return 0;
+  return std::clamp(kDigits - 1 - static_cast<int>(std::floor(std::log10(largest))), 0, needed);
+}
+
+std::string ForcingTotals::ValueText(std::size_t column, std::size_t period, const TimeSpan& span, int decimals) const {
   const Column& c = columns[column];
   if (period >= c.sums.size() || c.sums[period].covered == 0) return {};
-  std::string text = FormatNumber(form.Of(c.sums[period]), "%.5g");
+  std::string text = fmt::format("{:.{}f}", form.Of(c.sums[period]), decimals);
   const double share = static_cast<double>(c.sums[period].covered) / static_cast<double>(span.Seconds());
   if (share < 1) text += fmt::format(" ({:.{}f}%)", share * 100, share > 0.995 ? 2 : 0);
   return text;

@@ -3,6 +3,7 @@
 #include "pages/document/coverage_page.h"
 
 #include <algorithm>
+#include <map>
 
 #include <fmt/format.h>
 
@@ -40,6 +41,28 @@ std::string TextOf(const CoverageRow& row) {
   return text.empty() ? "nothing is wrong with it" : text;
 }
 
+/// What the files of a forcing's stations must have in common to be told in one line: all but who the station is.
+std::string CauseOf(const CoverageRow& row) {
+  const std::size_t colon = row.file.title.find(": ");
+  SetupPath path = ParseSetupPath(row.file.path);
+  constexpr std::size_t kStationAndFile = 2;
+  // What is no station's stands alone.
+  if (colon == std::string::npos || path.steps.size() <= kStationAndFile) return row.file.path;
+  std::string owner;
+  for (std::size_t i = 0; i + kStationAndFile < path.steps.size(); ++i)
+    owner += fmt::format("{}#{}/", path.steps[i].name, path.steps[i].instance);
+  return fmt::format("{}\n{}\n{}\n{}\n{}\n{}\n{}\n{}", owner, row.file.title.substr(colon), NameOf(row.state),
+                     row.file.use.path, row.PeriodText(), row.problem.empty() ? row.TimeText() : row.problem,
+                     row.AreaText(), TextOf(row));
+}
+
+/// "▸ 50 × Station Data - Precipitation Rate": a group with its sign, or the title of one file.
+std::string DataText(const CoverageFileRow& row) {
+  if (row.count == 1) return (row.isInGroup ? "    " : "") + row.file->file.title;
+  return fmt::format("{} {} × {}", row.isOpen ? "▾" : "▸", row.count,
+                     row.file->file.title.substr(row.file->file.title.find(": ") + 2));
+}
+
 std::string TextOf(const ForcingTotals& totals) {
   std::string text = totals.Heading();
   for (const Finding& remark : totals.remarks) text += fmt::format("\n{}: {}", NameOf(remark.severity), remark.text);
@@ -62,12 +85,11 @@ bool CCoverageDlg::Follow() {
 void CCoverageDlg::ShowBoard(std::shared_ptr<const CoverageBoard> board) {
   board_ = std::move(board);
   // What needs the user most comes first.
-  files_.clear();
-  for (const CoverageRow& row : board_->rows) files_.push_back(&row);
-  std::ranges::stable_sort(files_, std::greater(), &CoverageRow::state);
+  GroupFiles();
   totals_.clear();
   for (const ForcingTotals& totals : board_->forcings)
-    for (std::size_t column = 0; column < totals.columns.size(); ++column) totals_.push_back({&totals, column});
+    for (std::size_t column = 0; column < totals.columns.size(); ++column)
+      totals_.push_back({&totals, column, totals.Decimals()});
   // Each period has a column of its own.
   using Row = CoverageTotalsRow;
   totalsTable_->ClearColumns();
@@ -85,7 +107,7 @@ void CCoverageDlg::ShowBoard(std::shared_ptr<const CoverageBoard> board) {
     totalsTable_
         ->Value(board_->periods[period].name,
                 [this, period](const Row& row) {
-                  return row.totals->ValueText(row.column, period, board_->periods[period].span);
+                  return row.totals->ValueText(row.column, period, board_->periods[period].span, row.decimals);
                 })
         .Width(80)
         .ToolTip("In brackets the share of the time that has values");
@@ -96,8 +118,42 @@ void CCoverageDlg::ShowBoard(std::shared_ptr<const CoverageBoard> board) {
   if (!files_.empty()) ShowFile(1);
 }
 
+void CCoverageDlg::GroupFiles() {
+  std::vector<const CoverageRow*> rows;
+  for (const CoverageRow& row : board_->rows) rows.push_back(&row);
+  std::ranges::stable_sort(rows, std::greater(), &CoverageRow::state);
+  // The stations of a forcing of which the same is to be told are one line, which opens.
+  std::map<std::string, std::size_t> groupOf;
+  std::vector<std::vector<const CoverageRow*>> groups;
+  for (const CoverageRow* row : rows) {
+    const auto [found, isNew] = groupOf.emplace(CauseOf(*row), groups.size());
+    if (isNew) groups.emplace_back();
+    groups[found->second].push_back(row);
+  }
+  files_.clear();
+  for (const auto& group : groups) {
+    if (group.size() == 1) {
+      files_.push_back({group.front()});
+      continue;
+    }
+    const std::string cause = CauseOf(*group.front());
+    const bool isOpen = open_.contains(cause);
+    files_.push_back({group.front(), group.size(), isOpen, cause});
+    if (!isOpen) continue;
+    for (const CoverageRow* row : group) files_.push_back({row, 1, false, {}, true});
+  }
+}
+
+void CCoverageDlg::OpenOrGoTo(const CoverageFileRow& row) {
+  if (row.count == 1) return GoTo(row.file->file.path);
+  const std::string cause = row.cause;
+  if (!open_.erase(cause)) open_.insert(cause);
+  GroupFiles();
+  if (Context().syncSoon) Context().syncSoon();
+}
+
 void CCoverageDlg::ShowFile(int row) {
-  const CoverageRow& shown = *files_[static_cast<std::size_t>(row - 1)];
+  const CoverageRow& shown = *files_[static_cast<std::size_t>(row - 1)].file;
   chosen_ = shown.file.path;
   extent_ = shown.extent && !shown.isInDegrees ? OutlineOf(*shown.extent) : nullptr;
 }
@@ -213,19 +269,20 @@ void CCoverageDlg::Describe(PageForm& form) {
   });
   form.Shown("Model domain:", [this] { return DomainText(); });
 
-  auto files = std::make_shared<TableOf<const CoverageRow*>>(files_);
+  using Row = CoverageFileRow;
+  auto files = std::make_shared<TableOf<Row>>(files_);
   files->ItemName("File");
-  files->Value("Data", [](const CoverageRow* row) { return row->file.title; })
+  files->Value("Data", [](const Row& row) { return DataText(row); })
       .Width(170)
-      .IconOf([](const CoverageRow* row) { return std::string(NameOf(row->state)); })
-      .Link([this](const CoverageRow* row) { GoTo(row->file.path); });
-  files->Value("File", [](const CoverageRow* row) { return std::string(FileNameOf(row->file.use.path)); }).Width(110);
-  files->Value("Period", &CoverageRow::PeriodText).Width(160);
+      .IconOf([](const Row& row) { return std::string(NameOf(row.file->state)); })
+      .Link([this](const Row& row) { OpenOrGoTo(row); });
+  files->Value("File", [](const Row& row) { return std::string(FileNameOf(row.file->file.use.path)); }).Width(110);
+  files->Value("Period", [](const Row& row) { return row.file->PeriodText(); }).Width(160);
   files
       ->Value("Simulation",
-              [](const CoverageRow* row) { return row->problem.empty() ? row->TimeText() : row->problem; })
+              [](const Row& row) { return row.file->problem.empty() ? row.file->TimeText() : row.file->problem; })
       .Width(150);
-  files->Value("Model domain", &CoverageRow::AreaText).Width(170);
+  files->Value("Model domain", [](const Row& row) { return row.file->AreaText(); }).Width(170);
   files->ShowOnly();
   files->OnChoose([this](int row) { ShowFile(row); });
   form.Table(files);

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <memory>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -17,6 +18,16 @@ namespace tervane {
 struct CoverageTotalsRow {
   const ForcingTotals* totals = nullptr;
   std::size_t column = 0;
+  int decimals = 0;
+};
+
+/// A row of the table of files: a file, or several of one cause in one line, which opens.
+struct CoverageFileRow {
+  const CoverageRow* file = nullptr;  ///< The first of several.
+  std::size_t count = 1;
+  bool isOpen = false;
+  std::string cause = {};  ///< What those of a group have in common.
+  bool isInGroup = false;  ///< Of a group that is open.
 };
 
 /// How the data cover the simulation and the model domain, and what the forcings come to.
@@ -33,6 +44,9 @@ class CCoverageDlg : public PageOf<CCoverageKvf> {
   /// Shows the board of now when it is computed; true when it is another one than before.
   bool Follow();
   void ShowBoard(std::shared_ptr<const CoverageBoard> board);
+  void GroupFiles();
+  /// A group opens or closes; of a file its page is shown.
+  void OpenOrGoTo(const CoverageFileRow& row);
   void ShowFile(int row);
   void ShowTotals(int row);
   void GoTo(const std::string& path) const;
@@ -44,7 +58,8 @@ class CCoverageDlg : public PageOf<CCoverageKvf> {
   SeriesContent Chart();
 
   std::shared_ptr<const CoverageBoard> board_;  ///< Null until one is computed.
-  std::vector<const CoverageRow*> files_;
+  std::vector<CoverageFileRow> files_;
+  std::set<std::string> open_;  ///< The causes of the groups that are open.
   std::vector<CoverageTotalsRow> totals_;
   std::shared_ptr<TableOf<CoverageTotalsRow>> totalsTable_;
   std::string chosen_;                          ///< The path of the file or forcing that map and chart show.

@@ -417,12 +417,28 @@ void TableView::resizeEvent(QResizeEvent* event) {
   if (!areColumnsTheUsers_) FitColumns();
 }
 
+int TableView::WidthOf(int column) const {
+  const TableForm& table = *control_.table;
+  const TableColumn& shown = *table.Column(column);
+  const int declared = Theme::Get().Scaled(shown.width);
+  if (!table.IsShownOnly() || shown.IsButton() || table.RowCount() == 0) return declared;
+  // The first rows stand for all; what is longer than two usual cells is cut, and read in its tool tip.
+  constexpr int kLookedAt = 60;
+  const QFontMetrics metrics = view_->fontMetrics();
+  const int padding = Theme::Get().Scaled(14), icon = shown.icon ? Theme::Get().Scaled(24) : 0;
+  QFont bold = view_->font();
+  bold.setBold(true);
+  int width = QFontMetrics(bold).horizontalAdvance(ToQt(table.Head(column)));
+  for (int row = 1; row <= std::min(table.RowCount(), kLookedAt); ++row)
+    width = std::max(width, icon + metrics.horizontalAdvance(ToQt(table.ShownCell(row, column))));
+  return std::min(width + padding, 2 * declared);
+}
+
 int TableView::WidthOfColumns() const {
   // A table that makes its columns later needs its room.
   if (model_->columnCount() == 0) return Theme::Get().Scaled(kTableWidth);
   int width = 2 * view_->frameWidth() + style()->pixelMetric(QStyle::PM_ScrollBarExtent);
-  for (int column = 1; column <= model_->columnCount(); ++column)
-    width += Theme::Get().Scaled(control_.table->Column(column)->width);
+  for (int column = 1; column <= model_->columnCount(); ++column) width += WidthOf(column);
   return width;
 }
 
@@ -435,7 +451,7 @@ void TableView::FitColumns() {
   int wanted = 0;
   for (int column = 0; column < model_->columnCount(); ++column) {
     const TableColumn& shown = *control_.table->Column(column + 1);
-    const int width = Theme::Get().Scaled(shown.width);
+    const int width = WidthOf(column + 1);
     // Buttons keep their width, so that their texts stay whole.
     (shown.IsButton() ? room : wanted) += shown.IsButton() ? -width : width;
   }
@@ -443,7 +459,7 @@ void TableView::FitColumns() {
   QHeaderView& head = *view_->horizontalHeader();
   for (int column = 0; column < model_->columnCount(); ++column) {
     const TableColumn& shown = *control_.table->Column(column + 1);
-    const int width = Theme::Get().Scaled(shown.width);
+    const int width = WidthOf(column + 1);
     head.setSectionResizeMode(column, shown.IsButton() ? QHeaderView::Fixed : QHeaderView::Interactive);
     const int smallest = std::min(Theme::Get().Scaled(50), width);
     head.resizeSection(column, shown.IsButton() ? width : std::max(smallest, static_cast<int>(width * share)));

@@ -68,6 +68,8 @@ class TableView : public QWidget {
   void OpenList();
   void ShowResult(const CellsResult& result, const QString& done);
   void SyncButtons();
+  /// As a column begins: of what is only shown as wide as its head and cells, else as it is declared.
+  int WidthOf(int column) const;
   /// Of all columns as they begin, with the edges of the table.
   int WidthOfColumns() const;
   void FitColumns();

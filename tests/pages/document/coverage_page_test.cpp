@@ -70,8 +70,27 @@ TEST_F(CoveragePage, ShowsOnTheMapWhereValuesAreMissingAndLeadsToTheNode) {
   EXPECT_FALSE(files.Press(row, 2));
 }
 
+TEST_F(CoveragePage, TellsStationsOfOneCauseInOneLineThatOpens) {
+  TableForm& files = *tables_[0];
+  const int closed = files.RowCount();
+  const int row = RowOf(files, "▸ 50 × Station Data - Precipitation Rate");
+  ASSERT_TRUE(files.Press(row, 1));
+  EXPECT_EQ(selected_, "") << "a group is no place";
+  EXPECT_EQ(files.RowCount(), closed + 50);
+  EXPECT_EQ(files.Cell(row, 1), "▾ 50 × Station Data - Precipitation Rate");
+  EXPECT_EQ(files.Cell(row + 2, 1), "    Gauge 47: Station Data - Precipitation Rate");
+  EXPECT_EQ(files.Cell(row + 2, 3), files.Cell(row, 3)) << "the same period";
+  ASSERT_TRUE(files.Press(row + 2, 1));
+  EXPECT_EQ(selected_, "Climate/PrecipitationRate/TIME_SERIES_2/TIME_SERIES_FILE");
+  ASSERT_TRUE(files.Press(row, 1));
+  EXPECT_EQ(files.RowCount(), closed);
+}
+
 TEST_F(CoveragePage, ShowsTheYearsOfAForcing) {
   TableForm& totals = *tables_[1];
+  // All numbers of a forcing have as many decimals.
+  const int gauge = RowOf(totals, "Precipitation Rate, total");
+  for (const int period : {4, 5, 6, 7}) EXPECT_EQ(totals.Cell(gauge, period).find('.'), std::string::npos);
   EXPECT_EQ(totals.Head(4), "2012");
   const int row = RowOf(totals, "Reference Evapotranspiration, total");
   EXPECT_EQ(totals.Cell(row, 3), "mm");
