@@ -65,7 +65,13 @@ void DifferenceList::Show(std::vector<SetupDifference> differences) {
     row->setData(0, kNumberRole, number);
     row->setText(1, KindText(difference.kind));
     if (number == chosen) setCurrentItem(row);
-    if (isSection && difference.from.empty() && difference.to.empty()) continue;
+    if (isSection && difference.from.empty() && difference.to.empty()) {
+      const bool isAdded = difference.kind == SetupDifference::Kind::Added;
+      if (!isAdded && difference.kind != SetupDifference::Kind::Removed) continue;
+      row->setText(isAdded ? 2 : 3, tr("not there"));
+      row->setText(isAdded ? 3 : 2, tr("there"));
+      continue;
+    }
     row->setText(2, ValueText(difference.from, difference.fromMeaning, difference.fromDefault));
     row->setText(3, ValueText(difference.to, difference.toMeaning, difference.toDefault));
     for (const int column : {2, 3}) row->setToolTip(column, row->text(column));

@@ -23,6 +23,7 @@
 #include "document/view_settings.h"
 #include "execution/engine_search.h"
 #include "execution/execute_flags.h"
+#include "shell/compare_view.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
 #include "shell/library_tab.h"
@@ -58,6 +59,7 @@ std::pair<QString, QString> TitleAndPath(const QWidget* tab) {
     return {frame->Title(), ToQt(frame->Session().Path())};
   if (const auto* library = qobject_cast<const LibraryTab*>(tab)) return {library->Title(), ToQt(library->Path())};
   if (const auto* viewer = qobject_cast<const DataViewer*>(tab)) return {viewer->Title(), ToQt(viewer->Path())};
+  if (const auto* comparison = qobject_cast<const CompareView*>(tab)) return {comparison->Title(), comparison->Path()};
   return {};
 }
 

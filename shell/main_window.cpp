@@ -26,7 +26,7 @@
 #include "platform/files.h"
 #include "platform/text_fields.h"
 #include "shell/changes_dialog.h"
-#include "shell/compare_dialog.h"
+#include "shell/compare_view.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
 #include "shell/library_tab.h"
@@ -397,17 +397,26 @@ bool MainWindow::ShowChanges(DocumentFrame& frame) {
 }
 
 void MainWindow::Compare(DocumentFrame& frame) {
-  const auto path = host_.AskFileToOpen({"Compare With", kSetupFilter, "tvd", frame.Session().Path()});
-  if (!path) return;
+  if (const auto path = host_.AskFileToOpen({"Compare With", kSetupFilter, "tvd", frame.Session().Path()}))
+    CompareWith(frame, *path);
+}
+
+bool MainWindow::CompareWith(DocumentFrame& frame, const std::string& path) {
   auto other = std::make_unique<CFlowModelDoc>();
-  if (!other->OnOpenDocument(*path)) {
+  if (!other->OnOpenDocument(path)) {
     host_.ShowMessage(other->Error(), Host::Icon::Error);
-    return;
+    return false;
   }
-  CompareDialog dialog(frame.Session(), frame.Name(), std::move(other), this);
-  connect(&dialog, &CompareDialog::PlaceChosen, &frame,
-          [&frame](const QString& place) { frame.GoToPath(FromQt(place)); });
-  dialog.exec();
+  auto* view = new CompareView(frame.Session(), frame.Name(), std::move(other));
+  connect(view, &CompareView::PlaceChosen, &frame, [this, &frame](const QString& place) {
+    tabs_->setCurrentWidget(&frame);
+    frame.GoToPath(FromQt(place));
+  });
+  // It shows the session of the frame.
+  connect(&frame, &QObject::destroyed, view, [view] { delete view; });
+  tabs_->setCurrentIndex(tabs_->addTab(view, view->Title()));
+  SyncCommands();
+  return true;
 }
 
 bool MainWindow::CloseTab(QWidget* tab) {

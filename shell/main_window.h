@@ -43,6 +43,10 @@ class MainWindow : public QMainWindow {
   bool OpenDocument(const QString& path);
   /// Shows a data file in a tab of its own, a text file in the desktop's editor. False when neither can be done; the
   /// user has been told why.
+  /// Asks for another setup, and shows in a tab how one that is open differs from it.
+  void Compare(DocumentFrame& frame);
+  /// The same with the setup of a file; false, with a message, where it cannot be read.
+  bool CompareWith(DocumentFrame& frame, const std::string& path);
   bool ShowDataFile(const QString& path);
   /// Opens a library of named entries in a tab of its own, or shows the one in which it is open.
   bool OpenLibrary(const LibraryKind& kind, const QString& path);
@@ -105,7 +109,6 @@ class MainWindow : public QMainWindow {
   /// Shows what a save would change; true when the user has then saved.
   bool ShowChanges(DocumentFrame& frame);
   /// Shows the document beside a setup that the user chooses.
-  void Compare(DocumentFrame& frame);
   /// Asks what is to be done about a file that another program has changed; true when the document is saved then.
   bool SaveBesideChange(DocumentFrame& frame);
   void CopyToKeyboardWidget(const char* operation);

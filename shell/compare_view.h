@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <QDialog>
+#include <QWidget>
 #include <memory>
 
 #include "document/edit_session.h"
@@ -14,17 +14,26 @@ namespace tervane {
 
 class DifferenceList;
 
-/// A setup beside another one, of which values can be taken.
-class CompareDialog : public QDialog {
+/// A setup beside another one in a tab: what differs, and what one of them has and the other has not. Values of the
+/// other can be taken. It goes with the tab of its setup.
+class CompareView : public QWidget {
   Q_OBJECT
 
  public:
-  CompareDialog(EditSession& session, const QString& name, std::unique_ptr<CFlowModelDoc> other, QWidget* parent);
-  ~CompareDialog() override;
+  CompareView(EditSession& session, const QString& name, std::unique_ptr<CFlowModelDoc> other);
+  ~CompareView() override;
+
+  /// "karup.tvd and other.tvd"
+  const QString& Title() const { return title_; }
+  /// The file of the other setup.
+  QString Path() const;
 
  signals:
   /// The user wants to see a place of his own setup.
   void PlaceChosen(const QString& path);
+
+ protected:
+  void showEvent(QShowEvent* event) override;
 
  private:
   void Sync();
@@ -33,7 +42,7 @@ class CompareDialog : public QDialog {
 
   EditSession& session_;
   std::unique_ptr<CFlowModelDoc> other_;
-  QString otherName_;
+  QString otherName_, title_;
   QLabel *summary_, *told_;
   DifferenceList* list_;
   QPushButton *take_, *show_;

@@ -1,9 +1,9 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "shell/compare_dialog.h"
+#include "shell/compare_view.h"
 
-#include <QDialogButtonBox>
 #include <QFileInfo>
+#include <QHBoxLayout>
 #include <QLabel>
 #include <QPushButton>
 #include <QVBoxLayout>
@@ -17,15 +17,11 @@
 
 namespace tervane {
 
-CompareDialog::CompareDialog(EditSession& session, const QString& name, std::unique_ptr<CFlowModelDoc> other,
-                             QWidget* parent)
-    : QDialog(parent),
-      session_(session),
+CompareView::CompareView(EditSession& session, const QString& name, std::unique_ptr<CFlowModelDoc> other)
+    : session_(session),
       other_(std::move(other)),
-      otherName_(QFileInfo(ToQt(other_->PathName())).fileName()) {
-  const Theme& theme = Theme::Get();
-  setWindowTitle(tr("%1 and %2").arg(name, otherName_));
-  resize(theme.Scaled(960), theme.Scaled(560));
+      otherName_(QFileInfo(ToQt(other_->PathName())).fileName()),
+      title_(tr("%1 and %2").arg(name, otherName_)) {
   auto* all = new QVBoxLayout(this);
   summary_ = new QLabel;
   all->addWidget(summary_);
@@ -34,44 +30,51 @@ CompareDialog::CompareDialog(EditSession& session, const QString& name, std::uni
   told_ = new QLabel;
   told_->setWordWrap(true);
   all->addWidget(told_);
-  auto* buttons = new QDialogButtonBox(QDialogButtonBox::Close);
-  take_ = buttons->addButton(tr("&Take This"), QDialogButtonBox::ActionRole);
+  auto* buttons = new QHBoxLayout;
+  buttons->addStretch();
+  take_ = new QPushButton(tr("&Take This"));
   take_->setToolTip(tr("Gives this key the value that it has in %1; Undo takes that back").arg(otherName_));
-  show_ = buttons->addButton(tr("&Show on Its Page"), QDialogButtonBox::ActionRole);
-  all->addWidget(buttons);
-  connect(take_, &QPushButton::clicked, this, &CompareDialog::Take);
+  show_ = new QPushButton(tr("&Show on Its Page"));
+  buttons->addWidget(take_);
+  buttons->addWidget(show_);
+  all->addLayout(buttons);
+  connect(take_, &QPushButton::clicked, this, &CompareView::Take);
   connect(show_, &QPushButton::clicked, this, [this] {
     const SetupDifference* chosen = list_->Chosen();
     if (!chosen) return;
-    const QString path = ToQt(chosen->key.empty() ? chosen->path : chosen->path + ":" + chosen->key);
-    accept();
-    emit PlaceChosen(path);
+    emit PlaceChosen(ToQt(chosen->key.empty() ? chosen->path : chosen->path + ":" + chosen->key));
   });
-  connect(buttons, &QDialogButtonBox::rejected, this, &QDialog::reject);
   connect(list_, &QTreeWidget::currentItemChanged, this, [this] {
     told_->clear();
     Sync();
   });
+}
+
+CompareView::~CompareView() = default;
+
+QString CompareView::Path() const { return ToQt(other_->PathName()); }
+
+void CompareView::showEvent(QShowEvent* event) {
+  QWidget::showEvent(event);
+  // The setup may be another one than when this was last seen.
   Compare();
 }
 
-CompareDialog::~CompareDialog() = default;
-
-void CompareDialog::Compare() {
+void CompareView::Compare() {
   list_->Show(DifferencesBetween(session_.Document(), *other_));
   const auto count = list_->Differences().size();
   summary_->setText(count == 0 ? tr("Both setups hold the same.") : tr("Places that differ: %1").arg(count));
   Sync();
 }
 
-void CompareDialog::Sync() {
+void CompareView::Sync() {
   const SetupDifference* chosen = list_->Chosen();
   const bool isThere = chosen && FindNode(session_.Document().Root(), ParseSetupPath(chosen->path).steps) != nullptr;
   take_->setEnabled(isThere && chosen->kind == SetupDifference::Kind::Changed && !chosen->key.empty());
   show_->setEnabled(isThere);
 }
 
-void CompareDialog::Take() {
+void CompareView::Take() {
   const SetupDifference* chosen = list_->Chosen();
   if (!chosen) return;
   const QString key = ToQt(chosen->key);
