@@ -12,7 +12,9 @@ target_compile_options(tervane_warnings INTERFACE
   $<$<NOT:$<CXX_COMPILER_ID:MSVC>>:-Wall -Wextra -Wpedantic -Wconversion -Wshadow -Wnon-virtual-dtor
     -Woverloaded-virtual -Wcast-align -Werror>
   $<$<CXX_COMPILER_ID:GNU>:-Wno-array-bounds -Wno-restrict -Wno-stringop-overflow
-    -Wno-stringop-overread>)
+    -Wno-stringop-overread>
+  # GCC takes sources that are compiled together for headers.
+  $<$<AND:$<BOOL:${CMAKE_UNITY_BUILD}>,$<CXX_COMPILER_ID:GNU>>:-Wno-subobject-linkage>)
 
 # tervane_precompile(TARGET KIND): the headers that nearly every source of a kind includes are read once, by the first
 # target of that kind: two thirds of compiling are reading headers. Those of ours are such as change seldom and are

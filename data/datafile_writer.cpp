@@ -20,7 +20,7 @@ namespace tervane {
 
 namespace {
 
-constexpr const char* kTimeUnits = "seconds since 1970-01-01 00:00:00";
+constexpr const char* kWrittenTimeUnit = "seconds since 1970-01-01 00:00:00";
 
 /// The first failure of a chain of calls; those behind it are not made.
 class Calls {
@@ -190,7 +190,7 @@ int DataFileWriter::State::Define() {
   if (content.hasTime) {
     time = define.Variable("time", NC_DOUBLE, {timeDimension});
     define.Text(time, "standard_name", "time");
-    define.Text(time, "units", kTimeUnits);
+    define.Text(time, "units", kWrittenTimeUnit);
     define.Text(time, "calendar", "proleptic_gregorian");
     define.Text(time, "axis", "T");
     if (hasIntervals) {

@@ -29,30 +29,29 @@ const LateCalls<Calls>& Loaded() {
 const Calls& Library() { return *Loaded().calls; }
 const std::string& WhyNoLibrary() { return Loaded().problem; }
 
-}  // namespace projections
+void ContextCloser::operator()(PJ_CONTEXT* context) const { Library().proj_context_destroy(context); }
 
-namespace {
-
-using projections::Library;
-
-struct ContextCloser {
-  void operator()(PJ_CONTEXT* context) const { Library().proj_context_destroy(context); }
-};
-struct ObjectCloser {
-  void operator()(PJ* object) const { Library().proj_destroy(object); }
-};
-using Context = std::unique_ptr<PJ_CONTEXT, ContextCloser>;
-using Object = std::unique_ptr<PJ, ObjectCloser>;
-
-/// Null without the library.
 Context MakeContext() {
-  if (!projections::WhyNoLibrary().empty()) return nullptr;
+  if (!WhyNoLibrary().empty()) return nullptr;
   Context context(Library().proj_context_create());
   Library().proj_log_level(context.get(), PJ_LOG_NONE);
   // No text that somebody typed should make the program ask the network.
   Library().proj_context_set_enable_network(context.get(), 0);
   return context;
 }
+
+}  // namespace projections
+
+namespace {
+
+using projections::Context;
+using projections::Library;
+using projections::MakeContext;
+
+struct ObjectCloser {
+  void operator()(PJ* object) const { Library().proj_destroy(object); }
+};
+using Object = std::unique_ptr<PJ, ObjectCloser>;
 
 /// PROJ's contexts must not be shared by threads. Opening the database costs some milliseconds, once for each thread.
 PJ_CONTEXT* ThreadContext() {

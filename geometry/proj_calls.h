@@ -4,6 +4,7 @@
 // The functions of PROJ that we call. A module has them, which is loaded when a projection is first asked for.
 #pragma once
 
+#include <memory>
 #include <string>
 
 #include <proj.h>
@@ -54,5 +55,13 @@ inline constexpr const char* kEntryName = "TervaneProjCalls";
 const Calls& Library();
 /// Why there is no library; empty when it is there. To be asked before the first call of a file or text.
 const std::string& WhyNoLibrary();
+
+struct ContextCloser {
+  void operator()(PJ_CONTEXT* context) const;
+};
+using Context = std::unique_ptr<PJ_CONTEXT, ContextCloser>;
+
+/// A context of the library that writes nothing and asks no network; null without the library.
+Context MakeContext();
 
 }  // namespace tervane::projections

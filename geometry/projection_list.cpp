@@ -13,19 +13,9 @@ namespace tervane {
 
 namespace {
 
+using projections::Context;
 using projections::Library;
-
-struct ContextCloser {
-  void operator()(PJ_CONTEXT* context) const { Library().proj_context_destroy(context); }
-};
-using Context = std::unique_ptr<PJ_CONTEXT, ContextCloser>;
-
-Context MakeContext() {
-  Context context(Library().proj_context_create());
-  Library().proj_log_level(context.get(), PJ_LOG_NONE);
-  Library().proj_context_set_enable_network(context.get(), 0);
-  return context;
-}
+using projections::MakeContext;
 
 /// A system with all that is sought in it, in lower case.
 struct Entry {

@@ -13,6 +13,9 @@
 
 namespace tervane {
 
+/// Steps of indentation, of the files that hold entries or branches in sections of a target.
+enum TextLevel { kTop, kInTarget, kInSection, kInBranch };
+
 /// A line that stands so many steps deep.
 std::string IndentedLine(int level, std::string_view text);
 /// The same for each line of a text.

@@ -17,12 +17,9 @@ namespace tervane {
 
 namespace {
 
-/// Steps of indentation.
-enum Level { kTop, kInTarget, kInEntry };
-
-class Reader {
+class LibraryReader {
  public:
-  Reader(const KvfFile& file, Library& library) : file_(file), library_(library), kind_(*library.kind) {}
+  LibraryReader(const KvfFile& file, Library& library) : file_(file), library_(library), kind_(*library.kind) {}
 
   /// False when there is no target of the kind.
   bool Read() {
@@ -70,7 +67,7 @@ class Reader {
     TakeContext(section, entry.context);
     entry.rows.reserve(section.count);
     for (const KvfNode* node = section.firstChild; node; node = node->next)
-      if (!node->IsKeyword() || !(ReadField(*node, entry) || ReadRow(*node, entry))) kept_.Keep(*node, kInEntry);
+      if (!node->IsKeyword() || !(ReadField(*node, entry) || ReadRow(*node, entry))) kept_.Keep(*node, kInSection);
     entry.atEnd = kept_.Take();
   }
 
@@ -156,13 +153,13 @@ void AppendEntry(std::string& text, const LibraryKind& kind, const LibraryEntry&
   for (std::size_t i = 0; i < kind.fields.size(); ++i) {
     const LibraryText& field = entry.fields[i];
     if (field.isThere || !field.text.empty())
-      AppendLine(text, kInEntry, fmt::format("{} = {}", kind.fields[i].key, KvfTextValue(field.text)), field.context);
+      AppendLine(text, kInSection, fmt::format("{} = {}", kind.fields[i].key, KvfTextValue(field.text)), field.context);
   }
   for (const LibraryRow& row : entry.rows) {
     std::string line = fmt::format("{} = ", kind.rowKey);
     for (std::size_t i = 0; i < kind.columns.size(); ++i)
       line += (i > 0 ? ", " : "") + NumberValue(kind.columns[i], row.values[i]);
-    AppendLine(text, kInEntry, line + row.more, row.context);
+    AppendLine(text, kInSection, line + row.more, row.context);
   }
   text += entry.atEnd + IndentedLine(kInTarget, "}\n");
 }
@@ -174,7 +171,7 @@ std::string ParseLibrary(const FileContent& text, const std::string& path, Libra
   KvfFile file;
   file.path = path;
   if (!ParseKvf(text, file)) return fmt::format("{}:{}", path, file.syntaxError.message);
-  Reader reader(file, library);
+  LibraryReader reader(file, library);
   if (reader.Read()) return {};
   library = Library(*library.kind);
   return fmt::format("{} is no {}: it has no target {}", path, library.kind->name, library.kind->target);

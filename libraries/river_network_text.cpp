@@ -19,9 +19,6 @@ namespace tervane {
 
 namespace {
 
-/// Steps of indentation.
-enum Level { kTop, kInTarget, kInSection, kInBranch };
-
 constexpr std::string_view kTarget = "FLUVANE_Network_editor";
 constexpr std::string_view kPoints = "POINTS", kBranches = "BRANCHES", kArea = "DATA_AREA";
 constexpr std::string_view kBranchPrefix = "Branch_";

@@ -36,13 +36,14 @@ std::unique_ptr<CYbSEDlgBase> MakeHelpPage(CYbSEKvfBase& node, PageContext conte
   return std::make_unique<CTvnHelpView>(node, std::move(context));
 }
 
-constexpr PageRow kPages[] = {
-    {kHelpPage, MakeHelpPage},
-    PageIs<COverviewDlg, COverviewKvf>(kOverviewPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> WholePages() { return kPages; }
+std::span<const PageRow> WholePages() {
+  static constexpr PageRow kRows[] = {
+      {kHelpPage, MakeHelpPage},
+      PageIs<COverviewDlg, COverviewKvf>(kOverviewPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

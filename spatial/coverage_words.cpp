@@ -15,8 +15,6 @@ namespace tervane {
 
 namespace {
 
-CYbDateTime DateAt(std::int64_t seconds) { return CYbDateTime::FromSecondsSinceEpoch(seconds); }
-
 /// A length of time for people: "12.5 days", "6 hours".
 std::string TimeLengthText(std::int64_t seconds) {
   constexpr std::int64_t kHour = 3600, kDay = 86400;
@@ -77,7 +75,9 @@ std::string MissingCellsText(const CoverageRow& row) {
 }
 
 std::string CoverageRow::PeriodText() const {
-  if (period) return fmt::format("{} to {}", DateInWords(DateAt(period->start)), DateInWords(DateAt(period->end)));
+  if (period)
+    return fmt::format("{} to {}", DateInWords(CYbDateTime::FromSecondsSinceEpoch(period->start)),
+                       DateInWords(CYbDateTime::FromSecondsSinceEpoch(period->end)));
   return file.use.isOverTime && problem.empty() ? "at all times" : "";
 }
 

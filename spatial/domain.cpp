@@ -18,8 +18,8 @@ namespace tervane {
 
 namespace {
 
-constexpr KeyChoice kSources[] = {{CCatchmentKvf::kGridFile, "Catchment defined by Nds File"},
-                                  {CCatchmentKvf::kShapeFile, "Catchment defined by Shape File"}};
+constexpr KeyChoice kDomainSources[] = {{CCatchmentKvf::kGridFile, "Catchment defined by Nds File"},
+                                        {CCatchmentKvf::kShapeFile, "Catchment defined by Shape File"}};
 
 /// The key of what keeps the grid from being made.
 const char* KeyOfProblem(const GridGeometry& grid) {
@@ -50,7 +50,7 @@ CCatchmentKvf::CCatchmentKvf(CYbSEKvfBase* parent)
 }
 
 void CCatchmentKvf::ExchangeKeys(KeyExchange& keys) {
-  keys.FromOne("type", Type).OneOf(kSources);
+  keys.FromOne("type", Type).OneOf(kDomainSources);
   keys("nxShp", nxShp);
   keys("nyShp", nyShp);
   keys("sizeShp", sizeShp).Quantity(quantity::kHorizontalLength);

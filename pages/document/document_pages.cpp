@@ -180,15 +180,14 @@ void CDisplayDlg::Import() {
   UpdateDoc(kDataChanged, "Import Area");
 }
 
-namespace {
+namespace {}  // namespace
 
-constexpr PageRow kPages[] = {
-    PageIs<CCoverageDlg, CCoverageKvf>(kCoveragePage),
-    PageIs<CDisplayDlg, COverlaysKvf>(kDisplayPage),
-};
-
-}  // namespace
-
-std::span<const PageRow> DocumentPages() { return kPages; }
+std::span<const PageRow> DocumentPages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<CCoverageDlg, CCoverageKvf>(kCoveragePage),
+      PageIs<CDisplayDlg, COverlaysKvf>(kDisplayPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

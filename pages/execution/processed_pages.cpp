@@ -319,20 +319,21 @@ void DescribeShapes(PageForm& form, CPreprocessedDataEntity& n) {
   });
 }
 
-constexpr PageRow kPages[] = {
-    DescribedBy<DescribeReport>(kProcDataPage),
-    DescribedBy<DescribeNothing>(kPreprocessedBlankPage),
-    DescribedBy<DescribeSeries>(kPreprocessedNds0Page),
-    DescribedBy<DescribeFile>(kPreprocessedNds1Page),
-    PageIs<CPreprocessedNDS2_PLOT, CPreprocessedDataEntity>(kPreprocessedNds2Page),
-    PageIs<CPreprocessedNDS3_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedNds3Page),
-    DescribedBy<DescribeText>(kPreprocessedTextPage),
-    DescribedBy<DescribeTextFile>(kPreprocessedTextFilePage),
-    DescribedBy<DescribeShapes>(kPreprocessedShapePage),
-};
-
 }  // namespace
 
-std::span<const PageRow> ProcessedPages() { return kPages; }
+std::span<const PageRow> ProcessedPages() {
+  static constexpr PageRow kRows[] = {
+      DescribedBy<DescribeReport>(kProcDataPage),
+      DescribedBy<DescribeNothing>(kPreprocessedBlankPage),
+      DescribedBy<DescribeSeries>(kPreprocessedNds0Page),
+      DescribedBy<DescribeFile>(kPreprocessedNds1Page),
+      PageIs<CPreprocessedNDS2_PLOT, CPreprocessedDataEntity>(kPreprocessedNds2Page),
+      PageIs<CPreprocessedNDS3_PLOTDlg, CPreprocessedDataEntity>(kPreprocessedNds3Page),
+      DescribedBy<DescribeText>(kPreprocessedTextPage),
+      DescribedBy<DescribeTextFile>(kPreprocessedTextFilePage),
+      DescribedBy<DescribeShapes>(kPreprocessedShapePage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -6,18 +6,13 @@
 
 #include "forms/table_of.h"
 #include "geometry/cart.h"
+#include "pages/parts/create_dialogs.h"
 
 namespace tervane {
 
 namespace {
 
 constexpr std::size_t kMostFound = 200;
-
-/// A dialog changes no setup.
-PageContext WithoutDocument(PageContext context) {
-  context.updateDoc = {};
-  return context;
-}
 
 }  // namespace
 

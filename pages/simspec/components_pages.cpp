@@ -132,14 +132,15 @@ void DescribeParticleComponents(PageForm& form, CModelCompPTKvf& n) {
   form.Check("Automatically register particles at pumping wells", n.AutomaticWellRegistration);
 }
 
-constexpr PageRow kPages[] = {
-    PageIs<CBasicParaDlg, CBasicParaKvf>(kBasicParaPage),
-    DescribedBy<DescribeWaterQualityComponents>(kModelCompWQPage),
-    DescribedBy<DescribeParticleComponents>(kModelCompPTPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> ComponentsPages() { return kPages; }
+std::span<const PageRow> ComponentsPages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<CBasicParaDlg, CBasicParaKvf>(kBasicParaPage),
+      DescribedBy<DescribeWaterQualityComponents>(kModelCompWQPage),
+      DescribedBy<DescribeParticleComponents>(kModelCompPTPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -151,15 +151,16 @@ void DescribeAirFlow(PageForm& form, CAirFlowModKvf& n) {
   constants.Number("Gravitational acceleration", n.GravityAcceleration);
 }
 
-constexpr PageRow kPages[] = {
-    DescribedBy<DescribeTimeSteps>(kTimeStepPage),           DescribedBy<DescribeTransportTimeSteps>(kTimeStepWQPage),
-    DescribedBy<DescribeParticleControl>(kControlPTPage),    DescribedBy<DescribeOverlandControl>(kControlOLPage),
-    DescribedBy<DescribeUnsaturatedControl>(kControlUZPage), DescribedBy<DescribeSaturatedControl>(kControlSZPage),
-    DescribedBy<DescribeColloidControl>(kColloidWQPage),     DescribedBy<DescribeAirFlow>(kAirFlowModPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> ControlPages() { return kPages; }
+std::span<const PageRow> ControlPages() {
+  static constexpr PageRow kRows[] = {
+      DescribedBy<DescribeTimeSteps>(kTimeStepPage),           DescribedBy<DescribeTransportTimeSteps>(kTimeStepWQPage),
+      DescribedBy<DescribeParticleControl>(kControlPTPage),    DescribedBy<DescribeOverlandControl>(kControlOLPage),
+      DescribedBy<DescribeUnsaturatedControl>(kControlUZPage), DescribedBy<DescribeSaturatedControl>(kControlSZPage),
+      DescribedBy<DescribeColloidControl>(kColloidWQPage),     DescribedBy<DescribeAirFlow>(kAirFlowModPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -174,18 +174,19 @@ void DescribeExtraParams(PageForm& form, CExtraParamsKvf& n) {
   form.Table(std::move(table));
 }
 
-constexpr PageRow kPages[] = {
-    DescribedBy<DescribeTitle>(kSimTitlePage),
-    DescribedBy<DescribeTitle>(kSimTitleWQPage),
-    DescribedBy<DescribeTitle>(kSimTitlePTPage),
-    PageIs<CSimPeriodDlg, CSimPeriodKvf>(kSimPeriodPage),
-    PageIs<CSimPeriodOnFlowDlg, CSimPeriodOnFlowBase>(kSimPeriodWQPage),
-    PageIs<CSimPeriodOnFlowDlg, CSimPeriodOnFlowBase>(kSimPeriodPTPage),
-    DescribedBy<DescribeExtraParams>(kExtraParamsPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> PeriodPages() { return kPages; }
+std::span<const PageRow> PeriodPages() {
+  static constexpr PageRow kRows[] = {
+      DescribedBy<DescribeTitle>(kSimTitlePage),
+      DescribedBy<DescribeTitle>(kSimTitleWQPage),
+      DescribedBy<DescribeTitle>(kSimTitlePTPage),
+      PageIs<CSimPeriodDlg, CSimPeriodKvf>(kSimPeriodPage),
+      PageIs<CSimPeriodOnFlowDlg, CSimPeriodOnFlowBase>(kSimPeriodWQPage),
+      PageIs<CSimPeriodOnFlowDlg, CSimPeriodOnFlowBase>(kSimPeriodPTPage),
+      DescribedBy<DescribeExtraParams>(kExtraParamsPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -117,12 +117,13 @@ void CData2DDlg::Describe(PageForm& form) {
   form.Map([this] { return Map(); }).ShownWhen(!isUniform);
 }
 
-constexpr PageRow kPages[] = {
-    PageIs<CData2DDlg, CData2DKvf>(kData2DPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> Data2DPages() { return kPages; }
+std::span<const PageRow> Data2DPages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<CData2DDlg, CData2DKvf>(kData2DPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -195,12 +195,13 @@ MapContent CCatchmentDlg::Map() {
   return map;
 }
 
-constexpr PageRow kPages[] = {
-    PageIs<CCatchmentDlg, CCatchmentKvf>(kCatchmentPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> DomainPages() { return kPages; }
+std::span<const PageRow> DomainPages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<CCatchmentDlg, CCatchmentKvf>(kCatchmentPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

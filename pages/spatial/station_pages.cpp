@@ -155,20 +155,21 @@ void DescribeTimeConstant(PageForm& form, CTimeseriesConstKvf& n, CYbSEDlgBase& 
                         {n.Global().TYPE, n.Global().FIXED_VALUE, n.Global().SeriesFile(), {n.GetItemType()}, {3}});
 }
 
-constexpr PageRow kPages[] = {
-    PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kStationBasedDataPage),
-    PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kPrecipitationPage),
-    PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kPotEvapTransPage),
-    PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kAirTemperaturePage),
-    DescribedBy<DescribeStation>(kStationPage),
-    DescribedBy<DescribeStation>(kPrecipitationStationPage),
-    DescribedBy<DescribeStation>(kPotEvapTransStationPage),
-    DescribedBy<DescribeStation>(kAirTemperatureStationPage),
-    DescribedBy<DescribeTimeConstant>(kTimeseriesConstPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> StationPages() { return kPages; }
+std::span<const PageRow> StationPages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kStationBasedDataPage),
+      PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kPrecipitationPage),
+      PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kPotEvapTransPage),
+      PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kAirTemperaturePage),
+      DescribedBy<DescribeStation>(kStationPage),
+      DescribedBy<DescribeStation>(kPrecipitationStationPage),
+      DescribedBy<DescribeStation>(kPotEvapTransStationPage),
+      DescribedBy<DescribeStation>(kAirTemperatureStationPage),
+      DescribedBy<DescribeTimeConstant>(kTimeseriesConstPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

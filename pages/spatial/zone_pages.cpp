@@ -77,14 +77,15 @@ class CSubcatchmentRiverLinksDlg : public PageOf<CSubcatchmentRiverlinksListKvf>
   }
 };
 
-constexpr PageRow kPages[] = {
-    PageIs<ZonesPage<kSubcatchmentWords>, CodedZonesKvf>(kSubcatchmentPage),
-    DescribedBy<DescribeSubcatchment>(kSubcatchmentPropPage),
-    PageIs<CSubcatchmentRiverLinksDlg, CSubcatchmentRiverlinksListKvf>(kRiverLinksPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> ZonePages() { return kPages; }
+std::span<const PageRow> ZonePages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<ZonesPage<kSubcatchmentWords>, CodedZonesKvf>(kSubcatchmentPage),
+      DescribedBy<DescribeSubcatchment>(kSubcatchmentPropPage),
+      PageIs<CSubcatchmentRiverLinksDlg, CSubcatchmentRiverlinksListKvf>(kRiverLinksPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -57,13 +57,14 @@ void DescribeSnowMelt(PageForm& form, CSnowmeltConstKvf& n) {
   form.Number("Factor for reducing the sublimation rate from dry snow ", n.SublimationRate);
 }
 
-constexpr PageRow kPages[] = {
-    DescribedBy<DescribeClimate>(kClimatePage),
-    DescribedBy<DescribeSnowMelt>(kSnowMeltPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> ClimatePages() { return kPages; }
+std::span<const PageRow> ClimatePages() {
+  static constexpr PageRow kRows[] = {
+      DescribedBy<DescribeClimate>(kClimatePage),
+      DescribedBy<DescribeSnowMelt>(kSnowMeltPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -307,16 +307,17 @@ void DescribeDemand(PageForm& form, CIrrDemandPropKvf& n, CYbSEDlgBase& page) {
   PlaceOfZone(form, n);
 }
 
-constexpr PageRow kPages[] = {
-    PageIs<ZonesPage<kWords>, CodedZonesKvf>(kCommandAreasPage),
-    PageIs<CIrrCommandAreasPropDlg, CIrrCommandAreasPropKvf>(kCommandAreaPage),
-    PageIs<ZonesPage<kWords>, CodedZonesKvf>(kDemandsPage),
-    DescribedBy<DescribeDemand>(kDemandPage),
-    PageIs<ZonesPage<kWords>, CodedZonesKvf>(kPrioritiesPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> IrrigationPages() { return kPages; }
+std::span<const PageRow> IrrigationPages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<ZonesPage<kWords>, CodedZonesKvf>(kCommandAreasPage),
+      PageIs<CIrrCommandAreasPropDlg, CIrrCommandAreasPropKvf>(kCommandAreaPage),
+      PageIs<ZonesPage<kWords>, CodedZonesKvf>(kDemandsPage),
+      DescribedBy<DescribeDemand>(kDemandPage),
+      PageIs<ZonesPage<kWords>, CodedZonesKvf>(kPrioritiesPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -16,12 +16,13 @@ void DescribeLandUse(PageForm& form, CLandUseKvf& n) {
       .RevalidatesLater();
 }
 
-constexpr PageRow kPages[] = {
-    DescribedBy<DescribeLandUse>(kLandUsePage),
-};
-
 }  // namespace
 
-std::span<const PageRow> LandUsePages() { return kPages; }
+std::span<const PageRow> LandUsePages() {
+  static constexpr PageRow kRows[] = {
+      DescribedBy<DescribeLandUse>(kLandUsePage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

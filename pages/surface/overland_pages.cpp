@@ -55,16 +55,17 @@ void DescribeFlowZone(PageForm& form, CTopographicalRoutingPropKvf& n) {
   PlaceOfZone(form, n);
 }
 
-constexpr PageRow kPages[] = {
-    DescribedBy<DescribeOverland>(kOverlandPage),
-    DescribedBy<DescribePondedDrainage>(kPondedDrainagePage),
-    PageIs<ZonesPage<kPondedAreaWords>, CodedZonesKvf>(kPondedWaterExchangePage),
-    PageIs<ZonesPage<kFlowZoneWords>, CodedZonesKvf>(kOverlandZonesPage),
-    DescribedBy<DescribeFlowZone>(kOverlandZonePage),
-};
-
 }  // namespace
 
-std::span<const PageRow> OverlandPages() { return kPages; }
+std::span<const PageRow> OverlandPages() {
+  static constexpr PageRow kRows[] = {
+      DescribedBy<DescribeOverland>(kOverlandPage),
+      DescribedBy<DescribePondedDrainage>(kPondedDrainagePage),
+      PageIs<ZonesPage<kPondedAreaWords>, CodedZonesKvf>(kPondedWaterExchangePage),
+      PageIs<ZonesPage<kFlowZoneWords>, CodedZonesKvf>(kOverlandZonesPage),
+      DescribedBy<DescribeFlowZone>(kOverlandZonePage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

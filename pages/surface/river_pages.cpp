@@ -103,13 +103,14 @@ class CRiverMFDlg : public PageOf<CRiverMFKvf> {
   }
 };
 
-constexpr PageRow kPages[] = {
-    PageIs<CRiverDlg, CRiverKvf>(kRiverPage),
-    PageIs<CRiverMFDlg, CRiverMFKvf>(kModflowRiverPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> RiverPages() { return kPages; }
+std::span<const PageRow> RiverPages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<CRiverDlg, CRiverKvf>(kRiverPage),
+      PageIs<CRiverMFDlg, CRiverMFKvf>(kModflowRiverPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

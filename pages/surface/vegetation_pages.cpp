@@ -189,13 +189,14 @@ void CVegetationTimeSeriesDlg::Describe(PageForm& form) {
   if (owner) form.Map([&n, owner] { return ZoneMap(owner->Stations(), &n); });
 }
 
-constexpr PageRow kPages[] = {
-    PageIs<CVegetationDlg, CVegetationKvf>(kVegetationPage),
-    PageIs<CVegetationTimeSeriesDlg, CVegetationTimeSeriesKvf>(kVegetationStationPage),
-};
-
 }  // namespace
 
-std::span<const PageRow> VegetationPages() { return kPages; }
+std::span<const PageRow> VegetationPages() {
+  static constexpr PageRow kRows[] = {
+      PageIs<CVegetationDlg, CVegetationKvf>(kVegetationPage),
+      PageIs<CVegetationTimeSeriesDlg, CVegetationTimeSeriesKvf>(kVegetationStationPage),
+  };
+  return kRows;
+}
 
 }  // namespace tervane

@@ -15,6 +15,11 @@ QColor CurveColor(std::size_t number, bool onDark);
 /// Quiet colours of layers of the ground, which lie beside each other.
 QColor LayerColor(std::size_t number, bool onDark);
 
+/// By how much a step of zooming enlarges.
+inline constexpr double kZoomStep = 1.5;
+/// What follows the pointer, drawn without the curves below it.
+inline constexpr const char* kPointerLayer = "pointer";
+
 /// Colours, fonts and sizes of the theme for the chart's axes, its legend and the box of a zoom.
 void StyleChart(QCustomPlot& chart);
 /// The legend stands above the chart, where it hides nothing.

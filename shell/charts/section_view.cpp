@@ -21,8 +21,6 @@ namespace tervane {
 
 namespace {
 
-constexpr double kZoomStep = 1.5;
-constexpr const char* kPointerLayer = "pointer";
 constexpr int kDistanceType = 100217, kElevationType = 100180, kMetre = 1000;
 constexpr std::array kExaggerations{1, 2, 5, 10, 20, 50, 100, 200};
 

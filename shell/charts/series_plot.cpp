@@ -26,9 +26,6 @@ namespace tervane {
 
 namespace {
 
-constexpr double kZoomStep = 1.5;
-constexpr const char* kPointerLayer = "pointer";
-
 QString NameOf(const Series& series) {
   QString name = ToQt(series.name);
   if (!series.unit.empty()) name += " [" + ToQt(series.unit) + "]";

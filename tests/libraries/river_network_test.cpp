@@ -21,7 +21,7 @@ std::string Network(const std::string& points, const std::string& branches) {
          "  }\n}\n";
 }
 
-CYbSimpleRiverData Parsed(const std::string& text) {
+CYbSimpleRiverData ParsedNetwork(const std::string& text) {
   CYbSimpleRiverData network;
   EXPECT_EQ(network.ParseNetwork(FileContent::Of(text), "a.fvnwk"), "");
   return network;
@@ -35,7 +35,7 @@ std::string Written(const CYbSimpleRiverData& network) {
 }
 
 /// Comments and parts that mean nothing to a network, at every place that a file has.
-constexpr const char* kFull =
+constexpr const char* kFullNetwork =
     "# head\n"
     "target OTHER {\n"
     "  Key = 1\n"
@@ -86,7 +86,7 @@ constexpr const char* kFull =
     "}\n";
 
 TEST(RiverNetwork, KeepsWhatItDoesNotKnowThroughARewrite) {
-  const CYbSimpleRiverData network = Parsed(kFull);
+  const CYbSimpleRiverData network = ParsedNetwork(kFullNetwork);
   EXPECT_THAT(network.Findings(), IsEmpty());
   ASSERT_EQ(network.branches.size(), 2u);
   EXPECT_EQ(network.branches[0].name, "Rho\"ne");
@@ -95,11 +95,11 @@ TEST(RiverNetwork, KeepsWhatItDoesNotKnowThroughARewrite) {
   EXPECT_EQ(network.branches[1].downstream, (RiverJunction{"Rho\"ne", 1000}));
   EXPECT_EQ(network.Extent(), (Envelope{0, 200, 600, 1200}));
   EXPECT_THAT(network.KeptSections(), ElementsAre("WEIR"));
-  EXPECT_EQ(Written(network), kFull);
+  EXPECT_EQ(Written(network), kFullNetwork);
 }
 
 TEST(RiverNetwork, CommentsStayInTheirSectionAndBranch) {
-  const CYbSimpleRiverData network = Parsed(
+  const CYbSimpleRiverData network = ParsedNetwork(
       "target FLUVANE_Network_Editor {\n  section POINTS {\n    # first\n    Point = 2, 1, 1, 5 # five\n"
       "    Point = 1, 0, 0, 0\n  }\n"
       "  section BRANCHES {\n    # of the branch\n    section Branch_9 {  # nine\n      Name = \"A\"\n"
@@ -153,7 +153,7 @@ TEST(RiverNetwork, TellsWhatIsWrongWithItsPlace) {
        "8: branch A: its water comes back to it: A, B, A"},
   };
   for (const auto& row : kCases) {
-    const CYbSimpleRiverData network = Parsed(Network(row.points, row.branches));
+    const CYbSimpleRiverData network = ParsedNetwork(Network(row.points, row.branches));
     std::vector<std::string> texts;
     for (const RiverFinding& finding : network.Findings()) texts.push_back(FindingText("a.fvnwk", finding));
     EXPECT_THAT(texts, testing::Contains("a.fvnwk:" + row.finding)) << row.points << row.branches;
@@ -162,7 +162,7 @@ TEST(RiverNetwork, TellsWhatIsWrongWithItsPlace) {
 
 TEST(RiverNetwork, WhatIsNoNetworkIsRefusedAndLeavesTheOldOne) {
   const TempFolder folder;
-  CYbSimpleRiverData network = Parsed(kFull);
+  CYbSimpleRiverData network = ParsedNetwork(kFullNetwork);
   for (const auto& [text, reason] :
        {std::pair("target FvRun {\n}\n", "is no river network: it has no target"),
         std::pair("target A {\n  section POINTS {\n", "a.fvnwk:3:1: "), std::pair("", "a.fvnwk:1:1: ")}) {
@@ -184,11 +184,11 @@ TEST(RiverNetwork, AFaultyNetworkIsNotWrittenOverWhatCouldNotBeRead) {
 }
 
 TEST(RiverNetwork, OtherBranchesTakeThePlaceOfTheOldOnesAndStructuresStay) {
-  CYbSimpleRiverData network = Parsed(kFull);
+  CYbSimpleRiverData network = ParsedNetwork(kFullNetwork);
   network.TakeBranches(
       {{.name = "New", .topoId = {}, .points = {{.place = {1, 2}}, {.place = {4, 6}, .chainage = 5}}}});
   network.SetArea({0.9, -3.7, 1e12, 6});
-  const CYbSimpleRiverData read = Parsed(Written(network));
+  const CYbSimpleRiverData read = ParsedNetwork(Written(network));
   EXPECT_THAT(read.Findings(), IsEmpty());
   ASSERT_EQ(read.branches.size(), 1u);
   EXPECT_EQ(read.branches[0].points[1].place, (MapPoint{4, 6}));
@@ -199,7 +199,7 @@ TEST(RiverNetwork, OtherBranchesTakeThePlaceOfTheOldOnesAndStructuresStay) {
 
 TEST(RiverNetwork, SimulationAndProjectFilesLeadToIt) {
   const TempFolder folder;
-  folder.Write("net.fvnwk", kFull);
+  folder.Write("net.fvnwk", kFullNetwork);
   const auto run = [](const std::string& target, const std::string& line) {
     return "target " + target + " {\n  section input {\n" + line + "  }\n}\n";
   };
@@ -245,7 +245,7 @@ TEST(RiverNetwork, ANewOneHasTheSectionsOfItsEditor) {
   EXPECT_THAT(text, HasSubstr("    verno = 112\n"));
   EXPECT_THAT(text, HasSubstr("    x0 = 100\n    y0 = 200\n    x1 = 300\n    y1 = 400\n"));
   EXPECT_THAT(text, HasSubstr("    SaveAllGridPoints = true\n"));
-  EXPECT_THAT(Parsed(text).KeptSections(), IsEmpty());
+  EXPECT_THAT(ParsedNetwork(text).KeptSections(), IsEmpty());
 }
 
 }  // namespace

@@ -9,13 +9,9 @@
 
 namespace tervane::test {
 
-namespace {
-
 void Require(const std::string& error) {
   if (!error.empty()) throw std::runtime_error(error);
 }
-
-}  // namespace
 
 void WriteGrid(const std::string& path, const GridGeometry& geometry, std::vector<float> values, int itemType) {
   CTvn2DOrthoRotatedGridData grid;

@@ -12,6 +12,9 @@
 
 namespace tervane::test {
 
+/// Fails the test with this error, unless it is empty.
+void Require(const std::string& error);
+
 /// A grid, row 0 in the south, with empty cells of `kUsualDeleteValue`.
 void WriteGrid(const std::string& path, const GridGeometry& geometry, std::vector<float> values, int itemType);
 /// A row of codes.

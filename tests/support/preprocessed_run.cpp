@@ -12,6 +12,7 @@
 #include "data/datafile_writer.h"
 #include "geometry/shapes.h"
 #include "platform/item_types.h"
+#include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane::test {
@@ -20,10 +21,6 @@ namespace {
 
 constexpr int kColumns = 48, kRows = 36, kLayers = 3;
 const GridGeometry kPlace{kColumns, kRows, 500, 480000, 6210000, 12, {}};
-
-void Require(const std::string& error) {
-  if (!error.empty()) throw std::runtime_error(error);
-}
 
 FileGeometry Geometry(int layers) {
   FileGeometry geometry;
