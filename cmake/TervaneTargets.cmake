@@ -118,6 +118,8 @@ function(tervane_test)
   else()
     tervane_precompile(${folder}_test setup_test)
   endif()
+  # Each source of a test has helpers of its own, with names that say no more than they must.
+  set_target_properties(${folder}_test PROPERTIES UNITY_BUILD OFF)
   # Most of a test is run once: compiling it is what takes time.
   target_compile_options(${folder}_test PRIVATE $<$<NOT:$<CXX_COMPILER_ID:MSVC>>:-O0>)
   add_test(NAME ${folder} COMMAND ${folder}_test)
