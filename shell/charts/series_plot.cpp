@@ -17,6 +17,7 @@
 #include "shell/charts/chart_markers.h"
 #include "shell/charts/chart_panels.h"
 #include "shell/charts/chart_style.h"
+#include "shell/charts/dense_graph.h"
 #include "shell/charts/series_chooser.h"
 #include "shell/charts/time_bars.h"
 #include "shell/widgets/qt_text.h"
@@ -258,7 +259,7 @@ void SeriesPlot::MarkMissing(int panel) {
 }
 
 void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) {
-  QCPGraph* graph = chart_->addGraph(keys, values);
+  auto* graph = new DenseGraph(keys, values);
   const auto shown = QSharedPointer<QCPGraphDataContainer>::create();
   QVector<QCPGraphData> points;
   const std::size_t count = std::min(PlaceCount(series), series.values.size());
@@ -278,7 +279,7 @@ void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) 
   graph->setData(shown);
   graph->setName(NameOf(series));
   graph->setAdaptiveSampling(true);
-  // Each value is seen as a point where points do not run together.
+  // A value between two gaps makes no line, and is seen as a point where points do not run together.
   constexpr qsizetype kFewPoints = 60;
   if (points.size() <= kFewPoints && !series.isStepped)
     graph->setScatterStyle(QCPScatterStyle(QCPScatterStyle::ssDisc, Theme::Get().Scaled(4)));

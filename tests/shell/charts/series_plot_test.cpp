@@ -7,6 +7,7 @@
 #include <QTest>
 #include <algorithm>
 #include <cmath>
+#include <functional>
 #include <limits>
 
 #include <gmock/gmock.h>
@@ -136,6 +137,115 @@ TEST(SeriesPlot, AGapIsEmptyAlsoAmongManyValues) {
     EXPECT_TRUE(isDrawn(30'000, 39'000));
     EXPECT_FALSE(isDrawn(41'000, 59'000));
     EXPECT_TRUE(isDrawn(61'000, 70'000));
+  }
+}
+
+/// The uppermost and the lowest pixel of a colour in each column of the chart's frame; -1 where there is none.
+std::vector<std::pair<int, int>> DrawnColumns(QCustomPlot& chart, const QColor& color) {
+  chart.replot();
+  const QImage picture = chart.grab().toImage();
+  const QRect frame = chart.axisRect()->rect().adjusted(1, 1, -1, -1);
+  std::vector<std::pair<int, int>> columns;
+  for (int x = frame.left(); x <= frame.right(); ++x) {
+    auto& [top, bottom] = columns.emplace_back(-1, -1);
+    for (int y = frame.top(); y <= frame.bottom(); ++y) {
+      if (picture.pixelColor(x, y) != color) continue;
+      if (top < 0) top = y;
+      bottom = y;
+    }
+  }
+  return columns;
+}
+
+TEST(SeriesPlot, ManyValuesLookAsIfEachLineWereDrawn) {
+  constexpr std::size_t kValues = 20'000;
+  const auto values = [](const std::function<double(double)>& value) {
+    std::vector<double> made(kValues);
+    for (std::size_t i = 0; i < kValues; ++i) made[i] = value(static_cast<double>(i));
+    return made;
+  };
+  const auto wave = [](double i) { return std::sin(i / 700) + 0.1 * std::sin(i * 2.3); };
+  const struct {
+    const char* name;
+    std::vector<double> values;
+    bool isStepped;
+    std::size_t jump;  ///< Days without a value before the second half.
+    double zoom;
+  } rows[] = {
+      {"a wave", values(wave), false, 0, 1},
+      {"steps", values(wave), true, 0, 1},
+      {"a single peak", values([](double i) { return i == 7777 ? 3 : 1; }), false, 0, 1},
+      {"gaps of all lengths", values([&](double i) { return std::fmod(i, 997) < i / 30 ? kGap : wave(i); }), false, 0,
+       1},
+      {"steps with gaps", values([&](double i) { return std::fmod(i, 997) < i / 30 ? kGap : wave(i); }), true, 0, 1},
+      {"a long line between two times", values(wave), false, 9000, 1},
+      {"a long step", values(wave), true, 9000, 1},
+      {"a part of the time", values(wave), false, 0, 3.3},
+      {"a cliff at the edge of a part", values([](double i) { return i < 7000 ? 5 : 1; }), false, 0, 3.3},
+  };
+  for (const auto& row : rows) {
+    SCOPED_TRACE(row.name);
+    SeriesContent content;
+    content.series = {Daily("Flow", "m3/s", row.values, row.isStepped)};
+    for (std::size_t i = kValues / 2; i < kValues; ++i)
+      content.series[0].times[i] = content.series[0].times[i] + CYbDateTimeSpan::Days(static_cast<double>(row.jump));
+    ShownChart shown(std::move(content));
+    QCustomPlot& chart = shown.Chart();
+    shown.Plot().Zoom(row.zoom);
+    QCPGraph* const ours = chart.graph(0);
+    const auto found = DrawnColumns(chart, ours->pen().color());
+    ours->setVisible(false);
+    QCPGraph* const plain = chart.addGraph();
+    plain->setData(ours->data());
+    plain->setPen(ours->pen());
+    plain->setBrush(ours->brush());
+    plain->setAdaptiveSampling(false);
+    plain->setAntialiased(false);
+    const auto expected = DrawnColumns(chart, plain->pen().color());
+    // Where a line ends between two pixels either may be taken, so that a column is compared with it and its
+    // neighbours.
+    const auto around = [](const std::vector<std::pair<int, int>>& columns, std::size_t i) {
+      std::pair<int, int> all(-1, -1);
+      for (std::size_t k = i > 0 ? i - 1 : 0; k < std::min(i + 2, columns.size()); ++k) {
+        if (columns[k].first < 0) continue;
+        all.first = all.first < 0 ? columns[k].first : std::min(all.first, columns[k].first);
+        all.second = std::max(all.second, columns[k].second);
+      }
+      return all;
+    };
+    const auto isWithin = [](const std::pair<int, int>& column, const std::pair<int, int>& other) {
+      return column.first < 0 ||
+             (other.first >= 0 && column.first >= other.first - 1 && column.second <= other.second + 1);
+    };
+    int drawn = 0, different = 0;
+    for (std::size_t i = 0; i < found.size(); ++i) {
+      drawn += expected[i].first >= 0;
+      different += !isWithin(found[i], around(expected, i)) || !isWithin(expected[i], around(found, i));
+    }
+    EXPECT_GT(drawn, 300);
+    EXPECT_EQ(different, 0);
+  }
+}
+
+TEST(SeriesPlot, AValueBetweenTwoGapsIsSeen) {
+  for (const std::size_t count : {100U, 20'000U}) {
+    for (const bool isStepped : {false, true}) {
+      SCOPED_TRACE(testing::Message() << count << " values, stepped " << isStepped);
+      std::vector<double> values(count, kGap);
+      const std::size_t lone = count / 3;
+      values[0] = values[1] = 1;  // from here on the chart shows
+      values[lone] = 2;
+      for (std::size_t i = count / 2; i < count; ++i) values[i] = 1 + static_cast<double>(i % 3);
+      SeriesContent content;
+      content.series = {Daily("Flow", "m3/s", values, isStepped)};
+      ShownChart shown(std::move(content));
+      // Smoothed lines mix their colour with the ground's.
+      shown.Chart().graph(0)->setAntialiased(false);
+      const auto found = DrawnColumns(shown.Chart(), shown.Chart().graph(0)->pen().color());
+      const auto column =
+          static_cast<std::size_t>(shown.At(static_cast<double>(lone)).x() - shown.Chart().axisRect()->left());
+      EXPECT_TRUE(found[column].first >= 0 || found[column - 1].first >= 0) << column;
+    }
   }
 }
 

@@ -1,0 +1,98 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "shell/charts/dense_graph.h"
+
+#include <algorithm>
+#include <cmath>
+#include <limits>
+
+namespace tervane {
+
+void DenseGraph::draw(QCPPainter* painter) {
+  Iterator begin, end;
+  getVisibleDataBounds(begin, end, QCPDataRange(0, dataCount()));
+  // With fewer points lines are told apart, and look better when they are drawn one by one.
+  constexpr int kManyInColumn = 2;
+  if (keyAxis()->scaleType() == QCPAxis::stLinear && end - begin > kManyInColumn * clipRect().width()) {
+    DrawColumns(painter, ColumnsOf(begin, end));
+    return;
+  }
+  QCPGraph::draw(painter);
+  if (scatterStyle().isNone()) DrawLonePoints(painter, begin, end);
+}
+
+std::vector<DenseGraph::Column> DenseGraph::ColumnsOf(Iterator begin, Iterator end) const {
+  constexpr double kInfinity = std::numeric_limits<double>::infinity();
+  const QRect area = clipRect();
+  std::vector<Column> columns(static_cast<std::size_t>(area.width()), {kInfinity, -kInfinity});
+  const auto add = [&columns](int column, double value) {
+    Column& taken = columns[static_cast<std::size_t>(column)];
+    taken.least = std::min(taken.least, value);
+    taken.most = std::max(taken.most, value);
+  };
+  const int last = area.width() - 1;
+  // A line is drawn in the pixel whose middle is nearest.
+  const double start = keyAxis()->pixelToCoord(area.left() - 0.5);
+  const double perKey = area.width() / (keyAxis()->pixelToCoord(area.left() - 0.5 + area.width()) - start);
+  double xBefore = 0, before = std::numeric_limits<double>::quiet_NaN();
+  for (Iterator point = begin; point != end; ++point) {
+    const double x = (point->key - start) * perKey, value = point->value;
+    if (std::isfinite(value)) {
+      const double column = std::floor(x);
+      if (column >= 0 && column <= last) add(static_cast<int>(column), value);
+      // Where a line passes from one column to the next, it belongs to both.
+      if (std::isfinite(before) && std::floor(xBefore) < column) {
+        const double slope = (value - before) / (x - xBefore);
+        const int first = static_cast<int>(std::clamp(std::floor(xBefore) + 1, 0.0, last + 1.0));
+        for (int border = first; border <= std::min(column, last + 1.0); ++border) {
+          const double there = before + (border - xBefore) * slope;
+          if (border > 0) add(border - 1, there);
+          if (border <= last) add(border, there);
+        }
+      }
+    }
+    xBefore = x;
+    before = value;
+  }
+  return columns;
+}
+
+void DenseGraph::DrawColumns(QCPPainter* painter, const std::vector<Column>& columns) const {
+  const QRect area = clipRect();
+  const auto pixel = [&](double value) {
+    const double y = valueAxis()->coordToPixel(value);
+    return static_cast<int>(std::lround(std::clamp(y, area.top() - 1.0, area.bottom() + 1.0)));
+  };
+  const int zero = pixel(0);
+  QVector<QRect> lines, fills;
+  for (std::size_t i = 0; i < columns.size(); ++i) {
+    const Column& column = columns[i];
+    if (column.least > column.most) continue;
+    const int x = area.left() + static_cast<int>(i), top = pixel(column.most), bottom = pixel(column.least);
+    lines.push_back(QRect(QPoint(x, top), QPoint(x, bottom)));
+    if (bottom < zero) fills.push_back(QRect(QPoint(x, bottom + 1), QPoint(x, zero)));
+    if (top > zero) fills.push_back(QRect(QPoint(x, zero), QPoint(x, top - 1)));
+  }
+  painter->setAntialiasing(false);
+  painter->setPen(Qt::NoPen);
+  if (brush().style() != Qt::NoBrush) {
+    painter->setBrush(brush());
+    painter->drawRects(fills);
+  }
+  if (pen().style() == Qt::NoPen) return;
+  painter->setBrush(pen().color());
+  painter->drawRects(lines);
+}
+
+void DenseGraph::DrawLonePoints(QCPPainter* painter, Iterator begin, Iterator end) const {
+  const auto isGap = [this](Iterator point) { return point == data()->constEnd() || !std::isfinite(point->value); };
+  const QCPScatterStyle dot(QCPScatterStyle::ssDisc, pen().widthF() + 2);
+  applyScattersAntialiasingHint(painter);
+  dot.applyTo(painter, pen());
+  for (Iterator point = begin; point != end; ++point) {
+    if (isGap(point) || !isGap(point + 1) || (point != data()->constBegin() && !isGap(point - 1))) continue;
+    dot.drawShape(painter, coordsToPixels(point->key, point->value));
+  }
+}
+
+}  // namespace tervane
