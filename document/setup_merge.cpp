@@ -4,11 +4,13 @@
 
 #include <cstdint>
 #include <memory>
+#include <utility>
 
 #include "core/kvf.h"
 #include "core/kvf_writer.h"
 #include "core/list.h"
 #include "core/path.h"
+#include "spatial/zone_sync.h"
 
 namespace tervane {
 
@@ -44,6 +46,60 @@ class Written {
   std::unique_ptr<KvfFile, CloseKvf> file_;
   KvfSection* target_;
 };
+
+/// The node that holds this one as an item, and what can be done with its items.
+class ItemOwner {
+ public:
+  explicit ItemOwner(CYbSEKvfBase* owner)
+      : list_(dynamic_cast<CYbSEKvfListBaseInterface*>(owner)), zones_(dynamic_cast<CFMSEKvfBase*>(owner)) {}
+
+  CYbSEKvfBase* Node() const { return list_ ? static_cast<CYbSEKvfBase*>(list_) : zones_; }
+  bool Holds(const CYbSEKvfBase& node) const {
+    return list_ ? list_->GetNumberWhatIs(&node) > 0 : zones_ && dynamic_cast<const CFMSEKvfGroupBase*>(&node);
+  }
+  /// Null where no item can be made.
+  CYbSEKvfBase* Add() const {
+    if (list_) {
+      const int count = list_->GetItemCount();
+      list_->AddItemNode();
+      return list_->GetItemCount() > count ? list_->GetItemNode(count + 1) : nullptr;
+    }
+    std::shared_ptr<CFMSEKvfGroupBase> zone = zones_ ? zones_->CreateStationItem() : nullptr;
+    if (zone) zones_->AddChild(zone);
+    return zone.get();
+  }
+  void Remove(CYbSEKvfBase& item) const {
+    if (list_)
+      list_->DeleteItem(list_->GetNumberWhatIs(&item), 1);
+    else
+      zones_->RemoveChild(&item);
+  }
+
+ private:
+  CYbSEKvfListBaseInterface* list_;
+  CFMSEKvfBase* zones_;
+};
+
+std::string PathAbove(const std::string& path) {
+  const std::size_t end = path.rfind('/');
+  return end == std::string::npos ? std::string() : path.substr(0, end);
+}
+
+/// Reads a node from a section that bears the name and the number that it has in another setup.
+void LoadFrom(CYbSEKvfBase& node, KvfSection& section) {
+  const std::string own = node.FormattedSectionName();
+  KvfName name = *section.name;
+  name.text = own.c_str();
+  name.length = static_cast<std::uint32_t>(own.size());
+  name.blanksBefore = name.blanksAfter = 0;
+  section.name = &name;
+  section.next = nullptr;
+  KvfSection alone;
+  alone.file = section.file;
+  alone.firstChild = alone.lastChild = &section;
+  alone.count = 1;
+  node.Load(&alone);
+}
 
 }  // namespace
 
@@ -86,6 +142,38 @@ CYbSEKvfBase* TakeValue(CFlowModelDoc& mine, const CFlowModelDoc& theirs, const 
   node->ReadData(section);
   problem = "the setup does not take this value here";
   return nullptr;
+}
+
+bool IsOfItem(const SetupDifference& difference) {
+  return difference.key.empty() &&
+         (difference.kind == SetupDifference::Kind::Added || difference.kind == SetupDifference::Kind::Removed);
+}
+
+CYbSEKvfBase* TakeItem(CFlowModelDoc& mine, const CFlowModelDoc& theirs, const SetupDifference& difference,
+                       std::string& problem) {
+  const bool isTheirs = difference.kind == SetupDifference::Kind::Added;
+  const std::vector<PathStep> steps = ParseSetupPath(difference.path).steps;
+  const std::vector<PathStep> above = ParseSetupPath(PathAbove(difference.path)).steps;
+  const ItemOwner owner(above.empty() ? nullptr : FindNode(mine.Root(), above));
+  const ItemOwner place(isTheirs && !above.empty() ? FindNode(theirs.Root(), above) : owner.Node());
+  CYbSEKvfBase* item = FindNode(isTheirs ? theirs.Root() : mine.Root(), steps);
+  if (!IsOfItem(difference) || !owner.Node() || !place.Node() || !item || !place.Holds(*item)) {
+    problem = "only an item of a list, or a zone, that one of the setups has can be taken";
+    return nullptr;
+  }
+  if (!isTheirs) {
+    owner.Remove(*item);
+    return owner.Node();
+  }
+  const Written there(theirs, mine.Root().SetupFolder());
+  KvfSection* section = there.Find(difference.path);
+  CYbSEKvfBase* added = section ? owner.Add() : nullptr;
+  if (!added) {
+    problem = "the setup does not take another item here";
+    return nullptr;
+  }
+  LoadFrom(*added, *section);
+  return owner.Node();
 }
 
 }  // namespace tervane

@@ -18,4 +18,12 @@ std::vector<SetupDifference> DifferencesBetween(const CFlowModelDoc& from, const
 CYbSEKvfBase* TakeValue(CFlowModelDoc& mine, const CFlowModelDoc& theirs, const SetupDifference& difference,
                         std::string& problem);
 
+/// Takes an item of a list, or a zone, that another setup has and this one has not, behind those that are there; or
+/// removes one that the other has not. The node that holds the items, which is to be told to the document; null, with
+/// the reason, for a difference of another kind, and where the setups are others now.
+CYbSEKvfBase* TakeItem(CFlowModelDoc& mine, const CFlowModelDoc& theirs, const SetupDifference& difference,
+                       std::string& problem);
+/// Whether the difference may be one for `TakeItem`.
+bool IsOfItem(const SetupDifference& difference);
+
 }  // namespace tervane

@@ -33,7 +33,10 @@ CompareView::CompareView(EditSession& session, const QString& name, std::unique_
   auto* buttons = new QHBoxLayout;
   buttons->addStretch();
   take_ = new QPushButton(tr("&Take This"));
-  take_->setToolTip(tr("Gives this key the value that it has in %1; Undo takes that back").arg(otherName_));
+  take_->setToolTip(
+      tr("Gives this key the value that it has in %1, adds an item that only %1 has, or removes one that it has not; "
+         "Undo takes that back")
+          .arg(otherName_));
   show_ = new QPushButton(tr("&Show on Its Page"));
   buttons->addWidget(take_);
   buttons->addWidget(show_);
@@ -70,25 +73,27 @@ void CompareView::Compare() {
 void CompareView::Sync() {
   const SetupDifference* chosen = list_->Chosen();
   const bool isThere = chosen && FindNode(session_.Document().Root(), ParseSetupPath(chosen->path).steps) != nullptr;
-  take_->setEnabled(isThere && chosen->kind == SetupDifference::Kind::Changed && !chosen->key.empty());
+  const bool isValue = isThere && chosen->kind == SetupDifference::Kind::Changed && !chosen->key.empty();
+  take_->setEnabled(isValue || (chosen && IsOfItem(*chosen)));
   show_->setEnabled(isThere);
 }
 
 void CompareView::Take() {
   const SetupDifference* chosen = list_->Chosen();
   if (!chosen) return;
-  const QString key = ToQt(chosen->key);
+  const QString key = ToQt(chosen->key), taken = key.isEmpty() ? ToQt(chosen->path) : key;
   std::string problem;
-  CYbSEKvfBase* node = TakeValue(session_.Document(), *other_, *chosen, problem);
+  CYbSEKvfBase* node = key.isEmpty() ? TakeItem(session_.Document(), *other_, *chosen, problem)
+                                     : TakeValue(session_.Document(), *other_, *chosen, problem);
   if (!node) {
     told_->setText(tr("Not taken: %1.").arg(ToQt(problem)));
     return;
   }
   node->SetRevalidateAll();
   session_.UpdateDoc(*node, kDataChanged | kTreeRebuilt | kRefreshPlots,
-                     FromQt(tr("Take %1 of %2").arg(key, otherName_)), nullptr, FromQt(key));
+                     FromQt(tr("Take %1 of %2").arg(taken, otherName_)), nullptr, FromQt(key));
   Compare();
-  told_->setText(tr("Taken: %1").arg(key));
+  told_->setText(tr("Taken: %1").arg(taken));
 }
 
 }  // namespace tervane

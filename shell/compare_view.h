@@ -14,8 +14,8 @@ namespace tervane {
 
 class DifferenceList;
 
-/// A setup beside another one in a tab: what differs, and what one of them has and the other has not. Values of the
-/// other can be taken. It goes with the tab of its setup.
+/// A setup beside another one in a tab: what differs, and what one of them has and the other has not. Values and
+/// items of the other can be taken. It goes with the tab of its setup.
 class CompareView : public QWidget {
   Q_OBJECT
 

@@ -52,6 +52,39 @@ TEST(SetupMerge, AValueIsTakenAndAllElseStays) {
   EXPECT_FALSE(Find(DifferencesBetween(mine, theirs), "SimSpec/SimTitle", "Title"));
 }
 
+TEST(SetupMerge, AnItemIsAddedOrRemovedAsTheOtherSetupHasIt) {
+  const std::string zones =
+      "section Subcatchments {\nDistributionType = 1\nNO_ZONES = 2\n"
+      "section Subcatchment {\nName = \"upper\"\nGRIDCODEID = \"1\"\nsection RIVERLINKS {\nNO_LINKS = 1\n}\n}\n"
+      "section Subcatchment {\nName = \"lower\"\nGRIDCODEID = \"2\"\nDefaultRiverLinks = 0\n}\n}";
+  const std::string parameters =
+      "section ExtraParams {\nNoOfParams = 2\nsection ExtraParam_1 {\nName = \"a\"\nType = 1\n}\n"
+      "section ExtraParam_2 {\nName = \"b\"\nType = 2\n}\n}";
+  CFlowModelDoc empty, full;
+  ASSERT_TRUE(empty.OpenText(SetupText(14, "section Subcatchments {\nDistributionType = 1\nNO_ZONES = 0\n}"), "a.tvd"));
+  ASSERT_TRUE(full.OpenText(SetupText(14, zones + parameters), "b.tvd"));
+  const std::string before = test::SavedText(empty);
+  const auto takeAll = [](CFlowModelDoc& mine, const CFlowModelDoc& theirs) {
+    int taken = 0;
+    for (bool again = true; again;) {
+      again = false;
+      for (const SetupDifference& difference : DifferencesBetween(mine, theirs)) {
+        std::string problem;
+        if (!IsOfItem(difference) || !TakeItem(mine, theirs, difference, problem)) continue;
+        again = ++taken < 20;
+        break;
+      }
+    }
+    return taken;
+  };
+  CFlowModelDoc other;
+  ASSERT_TRUE(other.OpenText(before, "a.tvd"));
+  EXPECT_EQ(takeAll(other, full), 4);
+  EXPECT_THAT(DifferencesBetween(other, full), testing::IsEmpty());
+  EXPECT_EQ(takeAll(other, empty), 4);
+  EXPECT_EQ(test::SavedText(other), before);
+}
+
 TEST(SetupMerge, WhatIsNoValueOfBothIsNotTaken) {
   CFlowModelDoc mine, theirs;
   ASSERT_TRUE(mine.OpenText(SetupText(14, ""), "a.tvd"));

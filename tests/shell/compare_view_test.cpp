@@ -48,10 +48,12 @@ TEST(CompareView, AValueIsTakenFromTheOtherSetupAndUndoTakesItBack) {
   EXPECT_EQ(value("SimSpec/SimTitle:Title"), "theirs");
   EXPECT_TRUE(list->findItems("Title", Qt::MatchExactly | Qt::MatchRecursive).isEmpty());
   EXPECT_EQ(frame.Session().Steps().UndoName(), "Take Title of other.tvd");
-  // An item of a list that this setup has not got cannot be taken.
   choose("ExtraParams/ExtraParam_1");
   EXPECT_EQ(list->currentItem()->text(2), "not there");
-  EXPECT_FALSE(button("Take This")->isEnabled());
+  button("Take This")->click();
+  EXPECT_EQ(value("ExtraParams/ExtraParam_1:Name"), "x");
+  EXPECT_EQ(frame.Session().Steps().UndoName(), "Take ExtraParams/ExtraParam_1 of other.tvd");
+  frame.Undo();
   // What brings other nodes brings their entries in the tree.
   choose("ModelType");
   button("Take This")->click();
