@@ -146,7 +146,7 @@ void MeasureChanges(MainWindow& window, const std::string& setup, double limit) 
            frame.Undo();
            Settle(window);
          }),
-         30, "ms");
+         std::max(30.0, limit), "ms");
 }
 
 // ---- Processed data
