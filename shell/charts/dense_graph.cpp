@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/charts/dense_graph.h"
 
+#include <QImage>
 #include <algorithm>
 #include <cmath>
 #include <limits>
@@ -59,29 +60,30 @@ std::vector<DenseGraph::Column> DenseGraph::ColumnsOf(Iterator begin, Iterator e
 
 void DenseGraph::DrawColumns(QCPPainter* painter, const std::vector<Column>& columns) const {
   const QRect area = clipRect();
-  const auto pixel = [&](double value) {
-    const double y = valueAxis()->coordToPixel(value);
-    return static_cast<int>(std::lround(std::clamp(y, area.top() - 1.0, area.bottom() + 1.0)));
+  const auto row = [&](double value) {
+    const double y = valueAxis()->coordToPixel(value) - area.top();
+    return static_cast<int>(std::lround(std::clamp(y, -1.0, area.height() + 0.0)));
   };
-  const int zero = pixel(0);
-  QVector<QRect> lines, fills;
-  for (std::size_t i = 0; i < columns.size(); ++i) {
-    const Column& column = columns[i];
+  // Pixel by pixel: the toolkit would divide each of some thousand narrow shapes among threads, and wait for them.
+  QImage picture(area.size(), QImage::Format_ARGB32_Premultiplied);
+  picture.fill(Qt::transparent);
+  const auto paint = [&](int x, int top, int bottom, QRgb color) {
+    for (int y = std::max(top, 0); y <= std::min(bottom, area.height() - 1); ++y)
+      reinterpret_cast<QRgb*>(picture.scanLine(y))[x] = color;
+  };
+  const bool isFilled = brush().style() != Qt::NoBrush, isDrawn = pen().style() != Qt::NoPen;
+  const QRgb fill = qPremultiply(brush().color().rgba()), line = qPremultiply(pen().color().rgba());
+  const int zero = row(0);
+  for (int x = 0; x < area.width(); ++x) {
+    const Column& column = columns[static_cast<std::size_t>(x)];
     if (column.least > column.most) continue;
-    const int x = area.left() + static_cast<int>(i), top = pixel(column.most), bottom = pixel(column.least);
-    lines.push_back(QRect(QPoint(x, top), QPoint(x, bottom)));
-    if (bottom < zero) fills.push_back(QRect(QPoint(x, bottom + 1), QPoint(x, zero)));
-    if (top > zero) fills.push_back(QRect(QPoint(x, zero), QPoint(x, top - 1)));
+    const int top = row(column.most), bottom = row(column.least);
+    if (isFilled) paint(x, std::min(top, zero), std::max(bottom, zero), fill);
+    if (isDrawn) paint(x, top, bottom, line);
   }
+  // Smoothed drawing would shift it by half a pixel.
   painter->setAntialiasing(false);
-  painter->setPen(Qt::NoPen);
-  if (brush().style() != Qt::NoBrush) {
-    painter->setBrush(brush());
-    painter->drawRects(fills);
-  }
-  if (pen().style() == Qt::NoPen) return;
-  painter->setBrush(pen().color());
-  painter->drawRects(lines);
+  painter->drawImage(area.topLeft(), picture);
 }
 
 void DenseGraph::DrawLonePoints(QCPPainter* painter, Iterator begin, Iterator end) const {
