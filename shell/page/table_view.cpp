@@ -448,21 +448,34 @@ void TableView::FitColumns() {
   const int edges = 2 * view_->frameWidth() + style()->pixelMetric(QStyle::PM_ScrollBarExtent);
   const QHeaderView& rowHeads = *view_->verticalHeader();
   int room = width() - edges - (rowHeads.isHidden() ? 0 : rowHeads.sizeHint().width());
-  int wanted = 0;
+  std::vector<int> widths;
   for (int column = 0; column < model_->columnCount(); ++column) {
-    const TableColumn& shown = *control_.table->Column(column + 1);
     const int width = WidthOf(column + 1);
     // Buttons keep their width, so that their texts stay whole.
-    (shown.IsButton() ? room : wanted) += shown.IsButton() ? -width : width;
+    if (control_.table->Column(column + 1)->IsButton())
+      room -= width;
+    else
+      widths.push_back(width);
   }
-  const double share = wanted > room ? static_cast<double>(std::max(room, 0)) / wanted : 1;
+  // Where room is short the widest columns give first: dates and numbers stay whole.
+  std::ranges::sort(widths);
+  int widest = widths.empty() ? 0 : widths.back();
+  int left = room;
+  for (std::size_t i = 0; i < widths.size(); ++i) {
+    const int share = left / static_cast<int>(widths.size() - i);
+    if (widths[i] > share) {
+      widest = share;
+      break;
+    }
+    left -= widths[i];
+  }
   QHeaderView& head = *view_->horizontalHeader();
   for (int column = 0; column < model_->columnCount(); ++column) {
     const TableColumn& shown = *control_.table->Column(column + 1);
     const int width = WidthOf(column + 1);
     head.setSectionResizeMode(column, shown.IsButton() ? QHeaderView::Fixed : QHeaderView::Interactive);
-    const int smallest = std::min(Theme::Get().Scaled(50), width);
-    head.resizeSection(column, shown.IsButton() ? width : std::max(smallest, static_cast<int>(width * share)));
+    const int smallest = std::min(Theme::Get().Scaled(75), width);
+    head.resizeSection(column, shown.IsButton() ? width : std::max(smallest, std::min(width, widest)));
   }
   const TableColumn* last = control_.table->Column(model_->columnCount());
   head.setStretchLastSection(!last || !last->IsButton());
