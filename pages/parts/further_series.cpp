@@ -77,6 +77,15 @@ bool FurtherSeries::AddFile(Host& host) {
   return true;
 }
 
+std::function<SeriesContent()> WithFurtherSeries(std::function<SeriesContent()> chart, FurtherSeries::Offers offers) {
+  const auto further = std::make_shared<FurtherSeries>(std::move(offers));
+  return [chart = std::move(chart), further] {
+    SeriesContent content = chart();
+    further->AddTo(content);
+    return content;
+  };
+}
+
 std::vector<SeriesOffer> OffersBeside(const DataFileNode& file, const std::string& group,
                                       const std::vector<NamedFile>& others) {
   std::vector<SeriesOffer> offers;

@@ -41,6 +41,9 @@ class FurtherSeries {
   std::vector<Chosen> chosen_;
 };
 
+/// A page's chart over which the user may lay others.
+std::function<SeriesContent()> WithFurtherSeries(std::function<SeriesContent()> chart, FurtherSeries::Offers offers);
+
 /// The series that a station or the like uses.
 struct NamedFile {
   std::string name;

@@ -33,15 +33,10 @@ void DescribeValueOrSeries(PageForm& form, CYbSEDlgBase& page, ValueOrSeries dat
   form.Number("Value:", data.value).ShownWhen(isConstant);
   DescribeSeriesFile(form, page, "Time Series File:", data.file, {data.value, data.itemTypes, data.valueTypes},
                      isSeries);
-  const auto further = std::make_shared<FurtherSeries>([&file = data.file, others = std::move(others)] {
+  const auto offers = [&file = data.file, others = std::move(others)] {
     return OffersBeside(file, "Other stations", others ? others() : std::vector<NamedFile>());
-  });
-  form.Chart([&file = data.file, further] {
-        SeriesContent chart = FileChart(file);
-        further->AddTo(chart);
-        return chart;
-      })
-      .ShownWhen(isSeries);
+  };
+  form.Chart(WithFurtherSeries([&file = data.file] { return FileChart(file); }, offers)).ShownWhen(isSeries);
 }
 
 /// The series of all stations beside one.

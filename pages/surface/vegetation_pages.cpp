@@ -99,14 +99,10 @@ void DescribeCourse(PageForm& form, const CYbSEDlgBase& page, VegetationCourse& 
                      {course.FIXED_VALUE_LAI, {quantity::kLeafAreaIndex}, {}, "LAI"}, isOverTime);
   DescribeSeriesFile(form, page, "RD Timeseries File:", course.RootDepthFile(),
                      {course.FIXED_VALUE_RD, {quantity::kRootDepth}, {}, "RD"}, isOverTime);
-  const auto further = std::make_shared<FurtherSeries>(
-      [&course, &owner] { return OffersBeside(course.LaiFile(), "Other stations", FilesOfOthers(course, owner)); });
-  form.Chart([&course, further] {
-        SeriesContent chart = SeriesChart(course);
-        further->AddTo(chart);
-        return chart;
-      })
-      .ShownWhen(isOverTime);
+  const auto offers = [&course, &owner] {
+    return OffersBeside(course.LaiFile(), "Other stations", FilesOfOthers(course, owner));
+  };
+  form.Chart(WithFurtherSeries([&course] { return SeriesChart(course); }, offers)).ShownWhen(isOverTime);
 }
 
 constexpr ZoneSourceWords kStationWords{.grid = "Station Based Distribution File:",

@@ -19,6 +19,13 @@ namespace {
 
 using testing::ElementsAre;
 
+/// Stations for the polygons of a shape file.
+void ChooseAreas(test::PageDriver& page, const std::string& shapeFile) {
+  page.Enter("Spatial Distribution:", "1");
+  page.Enter("Data Type:", "1");
+  page.Enter("Shape File:", shapeFile);
+}
+
 TEST(StationPage, AFileOfAreasMakesTheStationsAndTheNameThatFillsGapsIsOneOfThem) {
   test::TempFolder folder;
   test::WriteShapes(folder.File("areas.shp"), ShapeKind::Polygon, AttributeKind::Text, {"Sion", "Brig"});
@@ -26,9 +33,7 @@ TEST(StationPage, AFileOfAreasMakesTheStationsAndTheNameThatFillsGapsIsOneOfThem
   CFlowModelDoc document;
   auto& forcing = *document.Root().Important(kPrecipitation);
   test::PageDriver page(document, "Climate/PrecipitationRate");
-  page.Enter("Spatial Distribution:", "1");
-  page.Enter("Data Type:", "1");
-  page.Enter("Shape File:", folder.File("areas.shp"));
+  ChooseAreas(page, folder.File("areas.shp"));
   EXPECT_EQ(forcing.Stations().ShapeFile().Attribute(), "CODE");  // the only one that there is
   EXPECT_THAT(forcing.GetStationNames(), ElementsAre("Brig", "Sion"));
   EXPECT_THAT(page.Find("Fill Gaps with:").Options(), ElementsAre("Brig", "Sion"));
@@ -73,9 +78,7 @@ TEST(StationPage, SeriesOfOtherStationsAndFilesAreLaidOverTheChart) {
   auto& forcing = *document.Root().Important(kPrecipitation);
   {
     test::PageDriver page(document, "Climate/PrecipitationRate");
-    page.Enter("Spatial Distribution:", "1");
-    page.Enter("Data Type:", "1");
-    page.Enter("Shape File:", folder.File("areas.shp"));
+    ChooseAreas(page, folder.File("areas.shp"));
   }
   const auto choose = [&](const char* name, const char* file, int item) {
     auto* station = dynamic_cast<C2DStationBasedDataTimeSeriesKvf*>(forcing.SelectStationByName(name));
