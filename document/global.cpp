@@ -21,6 +21,8 @@
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
+#include "subsurface/saturated_zone.h"
+#include "subsurface/unsaturated_zone.h"
 #include "surface/climate.h"
 #include "surface/land_use.h"
 #include "surface/overland.h"
@@ -76,6 +78,8 @@ constexpr std::array kChildren{
     Child<CRiverMFKvf>(kModflowRiver),
     Child<COverlandKvf>(kOverland),
     Child<CTopographicalRoutingKvf>(kOverlandZones),
+    Child<CUnsatzoneKvf>(kUnsaturatedZone),
+    Child<CSatZoneKvf>(kSaturatedZone),
     ChildRow{MakeBy<NewGroundwaterTable>, {}},
     Child<CExtraParamsKvf>(),
     Child<CExecuteEngineFlagsKvf>(kExecuteFlags),
@@ -84,14 +88,12 @@ constexpr std::array kChildren{
     Child<CCoverageKvf>(kCoverage),
 };
 
-// The reading order, in important names; a name that no node bears is passed over.
+// The reading order, in important names; a name that no node bears is passed over. Behind these the unsaturated zone is
+// read. The saturated zone is read at its place, which sizes its lists of layers, and once more at the end, when
+// species and processes are known.
 
 /// Read behind all others, in this order: species must stand before everything that keeps a list per species.
 constexpr std::array<std::string_view, 3> kReadBehind{"SPECIES_LIST", "PROCESSESWQ", kOverland.text};
-/// Read behind those.
-constexpr std::string_view kUnsaturatedZone = "Unsatzone";
-/// Read at its place, which sizes its lists of layers, and once more when species and processes are known.
-constexpr std::string_view kSaturatedZone = "SATZONE";
 /// In files of version 1 read by the basic parameters, inside their section.
 constexpr std::string_view kStoringResults = "STORINGRESULTS";
 /// Setups of older versions keep the paved areas here, which now belong to overland flow.
@@ -117,7 +119,7 @@ void CGlobal::Load(KvfNode* parentSection) {
   for (CYbSEKvfBase* child = GetFirstChild(); child; child = GetNextChild(child)) {
     const bool isReadBehind = std::any_of(kReadBehind.begin(), kReadBehind.end(),
                                           [&](std::string_view name) { return child == GetImportantNode(name); }) ||
-                              child == GetImportantNode(kUnsaturatedZone);
+                              child == GetImportantNode(kUnsaturatedZone.text);
     // From the second child on the version of the file is known.
     const bool wasReadBefore = child == GetImportantNode(kStoringResults) && ReadDocVersion() == 1;
     if (!isReadBehind && !wasReadBefore) child->Load(target);
@@ -127,8 +129,8 @@ void CGlobal::Load(KvfNode* parentSection) {
   if (ReadDocVersion() < kFirstVersionOfPondedDrainage)
     if (auto* overland = Important(kOverland))
       overland->LoadPavedAreas(kvfSectionByNameNum(target, kLandUseSection, 1));
-  if (CYbSEKvfBase* node = GetImportantNode(kUnsaturatedZone)) node->Load(target);
-  if (CYbSEKvfBase* node = GetImportantNode(kSaturatedZone)) ReloadSaturatedZone(*node, target);
+  if (CYbSEKvfBase* node = GetImportantNode(kUnsaturatedZone.text)) node->Load(target);
+  if (CYbSEKvfBase* node = GetImportantNode(kSaturatedZone.text)) ReloadSaturatedZone(*node, target);
 
   if (auto retired = RemoveChild(GetImportantNode(kRetired))) retired_.push_back(std::move(retired));
 }

@@ -11,6 +11,8 @@
 #include "pages/spatial/domain_pages.h"
 #include "pages/spatial/station_pages.h"
 #include "pages/spatial/zone_pages.h"
+#include "pages/subsurface/saturated_zone_pages.h"
+#include "pages/subsurface/unsaturated_zone_pages.h"
 #include "pages/surface/climate_pages.h"
 #include "pages/surface/irrigation_pages.h"
 #include "pages/surface/land_use_pages.h"
@@ -29,11 +31,23 @@ struct PageFile {
   std::span<const PageRow> (*rows)();
 };
 constexpr PageFile kFiles[] = {
-    {"document", WholePages},      {"document", DocumentPages},  {"simspec", ComponentsPages},
-    {"simspec", ControlPages},     {"simspec", PeriodPages},     {"spatial", Data2DPages},
-    {"spatial", DomainPages},      {"spatial", StationPages},    {"spatial", ZonePages},
-    {"surface", ClimatePages},     {"surface", LandUsePages},    {"surface", VegetationPages},
-    {"surface", OverlandPages},    {"surface", IrrigationPages}, {"surface", RiverPages},
+    {"document", WholePages},
+    {"document", DocumentPages},
+    {"simspec", ComponentsPages},
+    {"simspec", ControlPages},
+    {"simspec", PeriodPages},
+    {"spatial", Data2DPages},
+    {"spatial", DomainPages},
+    {"spatial", StationPages},
+    {"spatial", ZonePages},
+    {"surface", ClimatePages},
+    {"surface", LandUsePages},
+    {"surface", VegetationPages},
+    {"surface", OverlandPages},
+    {"surface", IrrigationPages},
+    {"surface", RiverPages},
+    {"subsurface", UnsaturatedZonePages},
+    {"subsurface", SaturatedZonePages},
     {"execution", ProcessedPages},
 };
 

@@ -24,9 +24,26 @@ class ProcessTemplates {
   /// Whether a template in use takes that input from the setup.
   virtual bool IsBuiltInUsed(int code) const = 0;
 
+  /// Whether a template is in use in that compartment.
+  virtual bool IsTemplateUsed(int compartment) const = 0;
+
+  enum Compartment : int { kOverland = 1, kUnsaturated = 2, kSaturated = 4 };
+
+  static constexpr int kPrimaryBulkDensity = 1110;
+  static constexpr int kSecondaryBulkDensity = 1120;
   static constexpr int kAirTemperature = 2020;
   static constexpr int kSolarRadiation = 2030;
+  static constexpr int kSoilTemperature = 2090;
 };
 inline constexpr ImportantName<ProcessTemplates> kProcessTemplates{"KINETRASPEC"};
+
+/// The species, "SPECIES_LIST".
+class SpeciesTypes {
+ public:
+  virtual ~SpeciesTypes() = default;
+  /// Whether a species of the list has that `Type`.
+  virtual bool HasSpeciesOfType(int type) const = 0;
+};
+inline constexpr ImportantName<SpeciesTypes> kSpeciesTypes{"SPECIES_LIST"};
 
 }  // namespace tervane

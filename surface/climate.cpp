@@ -6,6 +6,7 @@
 
 #include "platform/item_types.h"
 #include "simspec/conditions.h"
+#include "simspec/water_quality_conditions.h"
 #include "surface/pages.h"
 
 namespace tervane {
@@ -26,22 +27,6 @@ Condition Switch(int CPrecipitationRelatedKvf::*flag) {
 }
 
 Condition HasSnow() { return Switch(&CPrecipitationRelatedKvf::SM); }
-
-Condition IsTakenByTemplates(const char* input, int code) {
-  return WaterQualityProcesses(kKinetra) &&
-         Condition::Sentence(fmt::format("a process template takes the {}", input), [code](const CYbSEKvfBase& node) {
-           const auto* templates = node.Important(kProcessTemplates);
-           return templates && templates->IsBuiltInUsed(code);
-         });
-}
-
-Condition IsAnyDecayTemperatureDependent() {
-  return WaterQualityProcesses(kSorptionAndDecay) &&
-         Condition::Sentence("a decay process depends on temperature", [](const CYbSEKvfBase& node) {
-           const auto* decays = node.Important(kDecayProcesses);
-           return decays && decays->IsAnyTemperatureDependent();
-         });
-}
 
 // ---- Forcings
 
@@ -197,11 +182,11 @@ CPrecipitationRelatedKvf::CPrecipitationRelatedKvf(CYbSEKvfBase* parent) : CTvnK
       ->TakesPartWhen(OwnEngine() && Component(&CModelCompKvf::ET));
   forcing(kSolarRadiation, SolarRadiation(), "Short Wave Solar Radiation", "SWSolarRadiation")
       ->TakesPartWhen(Switch(&Climate::IncludeSolarRadiation) ||
-                      IsTakenByTemplates("solar radiation", ProcessTemplates::kSolarRadiation));
+                      TakenByTemplates("solar radiation", ProcessTemplates::kSolarRadiation));
   auto* temperature = forcing(kAirTemperature, AirTemperature(), "Air Temperature", "AirTemperature");
   temperature->SetOldSectionName(kLastVersionOfOldNames, "SNOWMELT");
-  temperature->TakesPartWhen(OwnEngine() && (HasSnow() || IsAnyDecayTemperatureDependent() ||
-                                             IsTakenByTemplates("air temperature", ProcessTemplates::kAirTemperature)));
+  temperature->TakesPartWhen(OwnEngine() && (HasSnow() || AnyDecayDependsOnTemperature() ||
+                                             TakenByTemplates("air temperature", ProcessTemplates::kAirTemperature)));
   NewChild<CData2DKvf>(kTemperatureLapseRate, Switch(&Climate::CorrectAirTemperature));
   NewChild<CData2DKvf>(kWetLapseRate, Switch(&Climate::UseWetDryLapseRate) && Switch(&Climate::CorrectAirTemperature));
   NewImportantChild<CSnowmeltConstKvf>(kSnowMelt);

@@ -28,6 +28,7 @@ class Templates : public CTvnKvfBase, public ProcessTemplates {
  public:
   explicit Templates(CYbSEKvfBase* parent) : CTvnKvfBase("", "", parent) {}
   bool IsBuiltInUsed(int code) const override { return code == used; }
+  bool IsTemplateUsed(int /*compartment*/) const override { return true; }
   int used = kAirTemperature;
 };
 
