@@ -42,7 +42,7 @@ struct PageContext {
 /// A page: edits one node and holds no values of its own.
 class CYbSEDlgBase {
  public:
-  CYbSEDlgBase(CYbSEKvfBase& node, PageContext context) : node_(node), context_(std::move(context)) {}
+  CYbSEDlgBase(CYbSEKvfBase& node, const PageContext& context) : node_(node), context_(context) {}
   virtual ~CYbSEDlgBase() = default;
 
   CYbSEKvfBase& Node() const { return node_; }
@@ -110,13 +110,13 @@ class CYbSEDlgBase {
 template <class NodeClass>
 class PageOf : public CYbSEDlgBase {
  public:
-  PageOf(CYbSEKvfBase& node, PageContext context) : CYbSEDlgBase(node, std::move(context)) {}
+  PageOf(CYbSEKvfBase& node, const PageContext& context) : CYbSEDlgBase(node, context) {}
   NodeClass& Node() const { return static_cast<NodeClass&>(CYbSEDlgBase::Node()); }
 };
 
 /// The page of a node by its class; null when the class is unknown or the node is of another class than the page edits.
-std::unique_ptr<CYbSEDlgBase> MakePage(const PageClass& page, CYbSEKvfBase& node, PageContext context);
+std::unique_ptr<CYbSEDlgBase> MakePage(const PageClass& page, CYbSEKvfBase& node, const PageContext& context);
 /// The same with its form alone: nothing is read, validated or changed for it.
-std::unique_ptr<CYbSEDlgBase> MakePageToRead(const PageClass& page, CYbSEKvfBase& node, PageContext context);
+std::unique_ptr<CYbSEDlgBase> MakePageToRead(const PageClass& page, CYbSEKvfBase& node, const PageContext& context);
 
 }  // namespace tervane

@@ -15,7 +15,7 @@ namespace tervane {
 /// A page class that nodes name, and how its page is made; `make` gives null for a node of another class.
 struct PageRow {
   const PageClass& page;
-  std::unique_ptr<CYbSEDlgBase> (*make)(CYbSEKvfBase& node, PageContext context);
+  std::unique_ptr<CYbSEDlgBase> (*make)(CYbSEKvfBase& node, const PageContext& context);
 };
 
 namespace page_rows {
@@ -47,10 +47,10 @@ class FunctionPage : public PageOf<typename NodeOf<decltype(describe)>::Type> {
 };
 
 template <class Page, class Node>
-std::unique_ptr<CYbSEDlgBase> Make(CYbSEKvfBase& node, PageContext context) {
+std::unique_ptr<CYbSEDlgBase> Make(CYbSEKvfBase& node, const PageContext& context) {
   if constexpr (!std::is_same_v<Node, CYbSEKvfBase>)
     if (!dynamic_cast<Node*>(&node)) return nullptr;
-  return std::make_unique<Page>(node, std::move(context));
+  return std::make_unique<Page>(node, context);
 }
 
 }  // namespace page_rows

@@ -99,7 +99,7 @@ class LibraryEditor::Rows : public RowsOf<LibraryRow> {
 
 class LibraryEditor::Page : public CYbSEDlgBase {
  public:
-  Page(LibraryEditor& editor, PageContext context) : CYbSEDlgBase(*editor.node_, std::move(context)), editor_(editor) {}
+  Page(LibraryEditor& editor, const PageContext& context) : CYbSEDlgBase(*editor.node_, context), editor_(editor) {}
 
  protected:
   void Describe(PageForm& form) override {
@@ -254,7 +254,7 @@ std::unique_ptr<CYbSEDlgBase> LibraryEditor::MakePage(Host& host, std::function<
                         changed();
                       }};
   context.syncSoon = std::move(soon);
-  auto page = std::make_unique<Page>(*this, std::move(context));
+  auto page = std::make_unique<Page>(*this, context);
   page->Initialize();
   return page;
 }

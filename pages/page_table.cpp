@@ -51,10 +51,10 @@ constexpr PageFile kFiles[] = {
     {"execution", ProcessedPages},
 };
 
-std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, PageContext context) {
+std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, const PageContext& context) {
   for (const PageFile& file : kFiles)
     for (const PageRow& row : file.rows())
-      if (row.page.name == page.name) return row.make(node, std::move(context));
+      if (row.page.name == page.name) return row.make(node, context);
   return nullptr;
 }
 
@@ -67,14 +67,14 @@ std::string_view PageFamilyOf(const PageClass& page) {
   return {};
 }
 
-std::unique_ptr<CYbSEDlgBase> MakePage(const PageClass& page, CYbSEKvfBase& node, PageContext context) {
-  std::unique_ptr<CYbSEDlgBase> made = Construct(page, node, std::move(context));
+std::unique_ptr<CYbSEDlgBase> MakePage(const PageClass& page, CYbSEKvfBase& node, const PageContext& context) {
+  std::unique_ptr<CYbSEDlgBase> made = Construct(page, node, context);
   if (made) made->Initialize();
   return made;
 }
 
-std::unique_ptr<CYbSEDlgBase> MakePageToRead(const PageClass& page, CYbSEKvfBase& node, PageContext context) {
-  std::unique_ptr<CYbSEDlgBase> made = Construct(page, node, std::move(context));
+std::unique_ptr<CYbSEDlgBase> MakePageToRead(const PageClass& page, CYbSEKvfBase& node, const PageContext& context) {
+  std::unique_ptr<CYbSEDlgBase> made = Construct(page, node, context);
   if (made) made->MakeForm();
   return made;
 }

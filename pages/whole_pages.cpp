@@ -8,8 +8,8 @@
 
 namespace tervane {
 
-CIntroductionDlg::CIntroductionDlg(CYbSEKvfBase& node, PageContext context)
-    : CTvnHelpView(node, std::move(context)), summary_(*this) {}
+CIntroductionDlg::CIntroductionDlg(CYbSEKvfBase& node, const PageContext& context)
+    : CTvnHelpView(node, context), summary_(*this) {}
 
 void CIntroductionDlg::Describe(PageForm& form) {
   summary_.Describe(form);
@@ -31,9 +31,9 @@ void COverviewDlg::Describe(PageForm& form) {
 
 namespace {
 
-std::unique_ptr<CYbSEDlgBase> MakeHelpPage(CYbSEKvfBase& node, PageContext context) {
-  if (dynamic_cast<const CIntroductionKvf*>(&node)) return std::make_unique<CIntroductionDlg>(node, std::move(context));
-  return std::make_unique<CTvnHelpView>(node, std::move(context));
+std::unique_ptr<CYbSEDlgBase> MakeHelpPage(CYbSEKvfBase& node, const PageContext& context) {
+  if (dynamic_cast<const CIntroductionKvf*>(&node)) return std::make_unique<CIntroductionDlg>(node, context);
+  return std::make_unique<CTvnHelpView>(node, context);
 }
 
 }  // namespace

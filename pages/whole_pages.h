@@ -15,7 +15,7 @@ namespace tervane {
 /// The first page of a setup: a summary of it above the help page that tells what the editor is for.
 class CIntroductionDlg : public CTvnHelpView {
  public:
-  CIntroductionDlg(CYbSEKvfBase& node, PageContext context);
+  CIntroductionDlg(CYbSEKvfBase& node, const PageContext& context);
 
  protected:
   void Describe(PageForm& form) override;

@@ -242,7 +242,7 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
   context.runDialog = [this](const std::string& title, CYbSEDlgBase& form, const std::function<std::string()>& accept) {
     return FormDialog(Translated(title), form, accept, this).exec() == QDialog::Accepted;
   };
-  auto made = MakePage(*pageClass, node, std::move(context));
+  auto made = MakePage(*pageClass, node, context);
   if (!made) return;
   node.Touch();
   if (page_) {

@@ -197,8 +197,8 @@ MapContent CPreprocessedNDS2_PLOT::Map() {
 /// the topography of the report.
 class CPreprocessedNDS3_PLOTDlg : public PageOf<CPreprocessedDataEntity> {
  public:
-  CPreprocessedNDS3_PLOTDlg(CYbSEKvfBase& node, PageContext context)
-      : PageOf(node, std::move(context)), section_(Context().syncSoon) {}
+  CPreprocessedNDS3_PLOTDlg(CYbSEKvfBase& node, const PageContext& context)
+      : PageOf(node, context), section_(Context().syncSoon) {}
 
   void SetData() override;
   /// Looks at the file's layers again.

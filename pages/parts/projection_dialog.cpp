@@ -7,6 +7,7 @@
 #include "forms/table_of.h"
 #include "geometry/cart.h"
 #include "pages/parts/create_dialogs.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -33,6 +34,7 @@ void ProjectionDialog::Describe(PageForm& form) {
   });
   form.Notice([this] {
     if (!problem_.empty()) return problem_;
+    if (Trimmed(typed_).empty()) return std::string("Type a part of a name, a code or a place to see what fits.");
     if (found_.empty()) return std::string("No coordinate system of the register holds all of these words.");
     return found_.size() == kMostFound ? fmt::format("The first {}; type more words to find fewer.", kMostFound)
                                        : std::string();

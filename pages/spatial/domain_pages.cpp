@@ -23,8 +23,8 @@ namespace {
 /// The model domain and its grid.
 class CCatchmentDlg : public PageOf<CCatchmentKvf> {
  public:
-  CCatchmentDlg(CYbSEKvfBase& node, PageContext context)
-      : PageOf(node, std::move(context)), question_(Context().syncSoon) {}
+  CCatchmentDlg(CYbSEKvfBase& node, const PageContext& context)
+      : PageOf(node, context), question_(Context().syncSoon) {}
 
  protected:
   void Describe(PageForm& form) override;

@@ -41,8 +41,8 @@ CellChoices ChoicesOf(KeyChoices keyChoices) {
 /// A command area with its sources; the current one is shown below their table.
 class CIrrCommandAreasPropDlg : public PageOf<CIrrCommandAreasPropKvf> {
  public:
-  CIrrCommandAreasPropDlg(CYbSEKvfBase& node, PageContext context)
-      : PageOf(node, std::move(context)), question_(Context().syncSoon) {}
+  CIrrCommandAreasPropDlg(CYbSEKvfBase& node, const PageContext& context)
+      : PageOf(node, context), question_(Context().syncSoon) {}
 
  protected:
   void Describe(PageForm& form) override;

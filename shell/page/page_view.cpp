@@ -17,6 +17,7 @@
 #include "pages/tree_entries.h"
 #include "shell/page/control_widget.h"
 #include "shell/page/group_row.h"
+#include "shell/page/table_view.h"
 #include "shell/widgets/flash_mark.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -145,7 +146,11 @@ PageView::~PageView() = default;
 QSize PageView::WantedSize() const {
   const int bar = style()->pixelMetric(QStyle::PM_ScrollBarExtent);
   const QSize content = scroll_->widget()->sizeHint();
-  return {std::max(content.width() + bar, Theme::Get().Scaled(520)), content.height() + bar};
+  int width = std::max(content.width(), Theme::Get().Scaled(520));
+  // A table takes what it is given, so that its hint is narrower than its columns.
+  for (const TableView* table : findChildren<TableView*>())
+    width = std::max(width, std::min(table->WantedWidth() + 4 * bar, Theme::Get().Scaled(900)));
+  return {width + bar, content.height() + bar};
 }
 
 QWidget* PageView::BuildForm(PageForm& form, int depth) {

@@ -27,7 +27,7 @@ struct TableRow {
 /// A page with a table of plain values that has every kind of cell, and with fields of its current row below.
 class TablePage : public CYbSEDlgBase {
  public:
-  explicit TablePage(PageContext context) : CYbSEDlgBase(node_, std::move(context)) {}
+  explicit TablePage(const PageContext& context) : CYbSEDlgBase(node_, context) {}
 
   std::vector<TableRow> rows;
   bool withX = true;

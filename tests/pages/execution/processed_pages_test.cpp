@@ -59,7 +59,7 @@ class RunSetup {
                         }};
     context.openDataFile = [this](const std::string& file) { opened_.push_back(file); };
     context.isReplacement = isReplacement;
-    return MakePage(*PageClassOf(*node), *node, std::move(context));
+    return MakePage(*PageClassOf(*node), *node, context);
   }
   /// The page as text, without the folder.
   std::string Text(const std::string& path, bool isReplacement = false) {

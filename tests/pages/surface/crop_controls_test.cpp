@@ -35,7 +35,7 @@ class CropPage : public testing::Test {
                           changes.push_back(fmt::format("{} {}", hint, action));
                         }};
     context.openDataFile = [this](const std::string& path) { opened = path; };
-    page = MakePage(kVegetationPage, vegetation, std::move(context));
+    page = MakePage(kVegetationPage, vegetation, context);
   }
   void AddCrop(const char* name, const CYbDateTime& start) {
     CVegetationItemKvf& crop = *crops.AddItem();

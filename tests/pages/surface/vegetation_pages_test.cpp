@@ -40,7 +40,7 @@ class VegetationPages : public testing::Test {
       EXPECT_EQ(accept(), "");
       return true;
     };
-    return MakePage(kVegetationPage, vegetation, std::move(context));
+    return MakePage(kVegetationPage, vegetation, context);
   }
   static Control& Find(CYbSEDlgBase& page, std::string_view label, int number = 1) {
     Control* found = nullptr;

@@ -25,7 +25,7 @@ class BrowsingHost : public NobodyToAsk {
 
 class ReportPage : public CYbSEDlgBase {
  public:
-  ReportPage(CYbSEKvfBase& node, PageContext context) : CYbSEDlgBase(node, std::move(context)) {}
+  ReportPage(CYbSEKvfBase& node, const PageContext& context) : CYbSEDlgBase(node, context) {}
   std::string path;
 
  protected:
