@@ -21,6 +21,7 @@
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
+#include "subsurface/reservoirs.h"
 #include "subsurface/saturated_zone.h"
 #include "subsurface/unsaturated_zone.h"
 #include "surface/climate.h"
@@ -80,6 +81,7 @@ constexpr std::array kChildren{
     Child<CTopographicalRoutingKvf>(kOverlandZones),
     Child<CUnsatzoneKvf>(kUnsaturatedZone),
     Child<CSatZoneKvf>(kSaturatedZone),
+    Child<CSatZoneSubCatchmentKvf>(kReservoirZone),
     ChildRow{MakeBy<NewGroundwaterTable>, {}},
     Child<CExtraParamsKvf>(),
     Child<CExecuteEngineFlagsKvf>(kExecuteFlags),

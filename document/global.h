@@ -9,11 +9,19 @@
 
 namespace tervane {
 
+/// What another editor may ask of a setup, once after a file was handed to it.
+struct EditorRequests {
+  bool domain = false;
+  bool layers = false;
+};
+
 /// The root of a setup: makes the whole tree, fixes the order in which its sections are read, and carries old files
 /// over.
 class CGlobal : public CTvnKvfGlobalBase {
  public:
   CGlobal();
+
+  EditorRequests Requests;  ///< Those that are open; not stored.
 
   int WriteUsedFlags() override { return 1; }
   int ReadDocVersion() const override;

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <charconv>
+#include <cmath>
 
 #include <fmt/format.h>
 
@@ -65,6 +66,17 @@ double KvfNumber(const KvfParam& param) {
     }
     default:
       return std::numeric_limits<double>::quiet_NaN();
+  }
+}
+
+void AddCorners(KvfFile& file, KvfSection& section, const Envelope& area) {
+  constexpr double kLeast = std::numeric_limits<int>::min(), kMost = std::numeric_limits<int>::max();
+  const std::pair<std::string_view, double> corners[] = {
+      {"x0", area.xMin}, {"y0", area.yMin}, {"x1", area.xMax}, {"y1", area.yMax}};
+  for (const auto& [key, value] : corners) {
+    file.BeginKeyword(section, key);
+    file.AddParam(KvfType::Int).asInt =
+        std::isfinite(value) ? static_cast<int>(std::clamp(std::trunc(value), kLeast, kMost)) : 0;
   }
 }
 

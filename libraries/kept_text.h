@@ -10,6 +10,7 @@
 #include <utility>
 
 #include "core/kvf_tree.h"
+#include "geometry/grid.h"
 
 namespace tervane {
 
@@ -26,6 +27,9 @@ std::string KvfNodeText(const KvfNode& node, int level);
 std::string KvfTextValue(std::string_view text);
 /// A number in any of its forms, with the digits that stand in the file; NaN for none.
 double KvfNumber(const KvfParam& param);
+
+/// Adds the corners of an area, `x0`, `y0`, `x1`, `y1`, as whole numbers: without their fractions.
+void AddCorners(KvfFile& file, KvfSection& section, const Envelope& area);
 
 /// Gathers, on a walk over a file in its order, what the reader does not take.
 class KeptText {

@@ -40,20 +40,10 @@ std::string Values(const KvfNode& keyword) {
   return text.size() > kMost ? text.substr(0, kMost) + "..." : text;
 }
 
-int Whole(double value) {
-  constexpr double kLeast = std::numeric_limits<int>::min(), kMost = std::numeric_limits<int>::max();
-  return std::isfinite(value) ? static_cast<int>(std::clamp(std::trunc(value), kLeast, kMost)) : 0;
-}
-
 std::string AreaText(const Envelope& area) {
   KvfFile file;
   KvfSection& section = *file.AddSection(file.top, KvfKind::Section, kArea);
-  const std::pair<std::string_view, double> corners[] = {
-      {"x0", area.xMin}, {"y0", area.yMin}, {"x1", area.xMax}, {"y1", area.yMax}};
-  for (const auto& [key, value] : corners) {
-    file.BeginKeyword(section, key);
-    file.AddParam(KvfType::Int).asInt = Whole(value);
-  }
+  AddCorners(file, section, area);
   return KvfNodeText(section, kInTarget);
 }
 

@@ -11,8 +11,12 @@
 #include "pages/spatial/domain_pages.h"
 #include "pages/spatial/station_pages.h"
 #include "pages/spatial/zone_pages.h"
+#include "pages/subsurface/drainage_pages.h"
+#include "pages/subsurface/internal_boundary_pages.h"
+#include "pages/subsurface/reservoir_pages.h"
 #include "pages/subsurface/saturated_zone_pages.h"
 #include "pages/subsurface/unsaturated_zone_pages.h"
+#include "pages/subsurface/well_pages.h"
 #include "pages/surface/climate_pages.h"
 #include "pages/surface/irrigation_pages.h"
 #include "pages/surface/land_use_pages.h"
@@ -48,6 +52,10 @@ constexpr PageFile kFiles[] = {
     {"surface", RiverPages},
     {"subsurface", UnsaturatedZonePages},
     {"subsurface", SaturatedZonePages},
+    {"subsurface", DrainagePages},
+    {"subsurface", WellPages},
+    {"subsurface", ReservoirPages},
+    {"subsurface", InternalBoundaryPages},
     {"execution", ProcessedPages},
 };
 

@@ -11,4 +11,16 @@ namespace tervane {
 inline constexpr PageClass kUnsaturatedZonePage{"CUnsatzoneDlg", 0};
 inline constexpr PageClass kSaturatedZonePage{"CSatZoneDlg", 0};
 
+inline constexpr PageClass kDrainagePage{"CDrainageSZDlg", 0};
+inline constexpr PageClass kModflowDrainsPage{"CDrainageMFSZDlg", 0};
+inline constexpr PageClass kWellsPage{"CSZWellDlg", 0};
+inline constexpr PageClass kReservoirZonePage{"CSatZoneSubCatchmentDlg", 0};
+inline constexpr PageClass kInterflowZonesPage{"CSZShallowGWRoutingDlg", 0};
+inline constexpr PageClass kInterflowZonePage{"CSZShallowGWRoutingPropDlg", 0};
+inline constexpr PageClass kBaseflowZonesPage{"CSZDeepGWRoutingDlg", 0};
+inline constexpr PageClass kBaseflowZonePage{"CSZDeepGWRoutingPropDlg", 0};
+inline constexpr PageClass kBaseflowReservoirPage{"CSZDeepGWRoutingReservoirDlg", 0};
+inline constexpr PageClass kInternalBoundariesPage{"CSZVerDiscrInternalBoundaryDlg", 0};
+inline constexpr PageClass kInternalBoundaryPage{"CSZVerDiscrInternalBoundaryPropDlg", 0};
+
 }  // namespace tervane

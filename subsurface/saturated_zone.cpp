@@ -3,7 +3,9 @@
 #include "subsurface/saturated_zone.h"
 
 #include "simspec/conditions.h"
+#include "subsurface/drainage.h"
 #include "subsurface/pages.h"
+#include "subsurface/wells.h"
 
 namespace tervane {
 
@@ -12,12 +14,15 @@ CSatZoneKvf::CSatZoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Saturated Zone", 
   TakesPartWhen(
       (OwnEngine() && Component(&CModelCompKvf::SZ) && !Method(&CModelCompKvf::SZ_ModelType, kLinearReservoir)) ||
       (AnyModflow() && ModflowComponent(&CModModelCompKvf::Subsurface)));
+  NewImportantChild<CDrainageSZKvf>(kDrainage);
+  NewImportantChild<CDrainageMFSZKvf>(kModflowDrains);
+  NewImportantChild<CSZWellKvf>(kWells, Wells);
 }
 
 void CSatZoneKvf::ExchangeKeys(KeyExchange& keys) {
   keys("DispersionOption", DispersionOption).OneOf(kDispersions);
-  constexpr int kFirstVersionOfSwitch = 8;
-  keys.Since(kFirstVersionOfSwitch)("Drainage", Drainage);
+  constexpr int kLastVersionWithOption = 7;
+  keys.Since(kLastVersionWithOption + 1)("Drainage", Drainage);
   keys("TypeOfGeoParaDistribution", ParameterDistribution).OneOf(kGroundParameterDistributions);
   keys("TypeOfVerDiscr", TypeOfVerDiscr).OneOf(kVerticalDiscretizations);
   keys("Wells", Wells);
@@ -28,6 +33,12 @@ void CSatZoneKvf::ExchangeKeys(KeyExchange& keys) {
   keys("TypeOfRelPerm", TypeOfRelPerm).OneOf(kRelativePermeabilities);
   keys("Threshold", Threshold);
   keys("MassTransferToImmobileWater", MassTransferToImmobileWater);
+  int option = CDrainageSZKvf::kNoDrainage;
+  keys.Until(kLastVersionWithOption, "DrainageOption", option);
+  if (!keys.IsReading() || keys.DocVersion() > kLastVersionWithOption) return;
+  Drainage = option > CDrainageSZKvf::kNoDrainage ? 1 : 0;
+  if (auto* drainage = Important(kDrainage))
+    drainage->SetOption(option == CDrainageSZKvf::kNoDrainage ? CDrainageSZKvf::kDownhill : option);
 }
 
 }  // namespace tervane

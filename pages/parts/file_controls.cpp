@@ -11,6 +11,24 @@
 
 namespace tervane {
 
+std::optional<FileName> CreateFileByDialog(const CYbSEDlgBase& page, Host::FileQuestion question, const FileName& now,
+                                           const std::function<FileResult(const std::string& path)>& write) {
+  const CYbSEKvfGlobalBase* root = page.Node().GetRoot();
+  const std::string folder = root ? root->SetupFolder() : std::string();
+  question.current = now.IsEmpty() ? folder : now.Absolute();
+  const auto path = page.Outside().AskFileToSave(question);
+  if (!path) return std::nullopt;
+  if (const FileResult created = write(*path); !created.Ok()) {
+    page.Outside().ShowMessage(created.error, Host::Icon::Error);
+    return std::nullopt;
+  }
+  return FileName::Picked(*path, folder);
+}
+
+void AllowRequest(const CYbSEKvfBase& node, const FileName& file, bool EditorRequests::*part) {
+  if (auto* root = dynamic_cast<CGlobal*>(node.GetRoot()); root && !file.IsEmpty()) root->Requests.*part = true;
+}
+
 void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const FileName& file, std::optional<int> item) {
   if (const COverlaysKvf* overlays = node.Important(kOverlays)) {
     if (PrepareGridState(*overlays, file, item, context.host).empty()) return;

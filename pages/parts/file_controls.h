@@ -8,9 +8,18 @@
 #include <string>
 
 #include "core/file_name.h"
+#include "document/global.h"
 #include "forms/page.h"
 
 namespace tervane {
+
+/// Asks where a new file is to stand and writes it. Nothing when the user gave up, or when it fails, which is told.
+/// `now` is the file that the page has.
+std::optional<FileName> CreateFileByDialog(const CYbSEDlgBase& page, Host::FileQuestion question, const FileName& now,
+                                           const std::function<FileResult(const std::string& path)>& write);
+
+/// Lets an editor that this file is handed to ask for a part of the setup; nothing for an empty name.
+void AllowRequest(const CYbSEKvfBase& node, const FileName& file, bool EditorRequests::*part);
 
 /// Opens a data file of a page in the program's viewer, with the backdrop prepared for it and, where one is told, its
 /// item.

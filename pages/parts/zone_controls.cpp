@@ -116,9 +116,13 @@ void DescribeZoneSource(PageForm& form, const CYbSEDlgBase& page, ZoneSource& so
       .DefaultExtension("nds2")
       .ShownWhen(byCodes)
       .Then(sync);
-  Control& edit =
-      form.Button("Edit...", [&page, &source] { EditDataFile(page.Context(), page.Node(), source.GridFile().File); })
-          .ShownWhen(byCodes);
+  Control& edit = form.Button("Edit...",
+                              [&page, &source, isDomainWanted = words.isDomainWanted] {
+                                const FileName& file = source.GridFile().File;
+                                if (isDomainWanted) AllowRequest(page.Node(), file, &EditorRequests::domain);
+                                EditDataFile(page.Context(), page.Node(), file);
+                              })
+                      .ShownWhen(byCodes);
   if (words.isEditBeside) edit.Beside();
   form.Button("Create...",
               [&page, &source, sync, newCode = words.newCode] {
@@ -187,9 +191,10 @@ void ZoneName(PageForm& form, const std::string& label, CodedZoneProp& zone) {
   });
 }
 
-void ZoneIdentity(PageForm& form, const std::string& zones, const CodedZoneProp& zone, const ZoneSource* source) {
+void ZoneIdentity(PageForm& form, const std::string& zones, const CodedZoneProp& zone, const ZoneSource* source,
+                  const std::string& codeLabel) {
   const auto id = [&zone] { return zone.GRIDCODEID; };
-  form.Shown("Grid code value:", id).ShownWhen(fmt::format("the {} are grid codes", zones), [source] {
+  form.Shown(codeLabel, id).ShownWhen(fmt::format("the {} are grid codes", zones), [source] {
     return source && source->UsesGridCodes();
   });
   form.Shown("Polygon:", id).ShownWhen(fmt::format("the {} are polygons", zones), [source] {
@@ -210,7 +215,7 @@ void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zone
                    TableOfZones& areas) {
   const auto sync = [&page, &zones] { return SyncWithSource(page.Outside(), zones); };
   if (zones.Kind().distribution) form.Choice("Spatial Distribution:", zones.DistributionType).Then(sync);
-  Control& type = form.Choice("Data Type:", zones.Type).Then(sync);
+  Control& type = form.Choice(words.type, zones.Type).Then(sync);
   if (!words.isTypeAlwaysShown) type.ShownWhen(zones.InForce());
   DescribeZoneSource(form, page, zones, words);
   areas.Describe(form, page);
@@ -220,7 +225,7 @@ void DescribeZones(PageForm& form, const CYbSEDlgBase& page, CodedZonesKvf& zone
         if (areas.Follow(map.awaited) && page.Context().syncSoon) page.Context().syncSoon();
         return map;
       })
-      .ShownWhen(zones.InForce());
+      .ShownWhen(zones.ByCodes() || zones.ByPolygons());
 }
 
 }  // namespace tervane

@@ -15,8 +15,12 @@
 
 namespace tervane {
 
+/// The filter of the grid files of most zones.
+inline constexpr const char* kZoneGridFilter = "UZ soil profile distr.files (*.nds2) |*.nds2|All Files (*.*) |*.*||";
+
 /// The words of a source's controls.
 struct ZoneSourceWords {
+  const char* type = "Data Type:";
   const char* grid = "Grid Distribution File:";
   const char* gridFilter = kGridFileFilter;
   const char* shape = "Shape Distribution File:";
@@ -24,6 +28,7 @@ struct ZoneSourceWords {
   const char* shapeTitle = "";  ///< Of the dialog in which a shape file is chosen; empty for the usual one.
   const char* units = "Units of X- and Y-axises:";
   bool isEditBeside = true;        ///< The button stands beside the grid file; else it begins a row.
+  bool isDomainWanted = false;     ///< An editor of the grid may ask for the domain.
   bool isTypeAlwaysShown = false;  ///< The kind of source is shown also where one zone serves the whole area.
   /// Of the cells of a new grid, by the node of the page; 1 where nothing is said.
   float (*newCode)(const CYbSEKvfBase& node) = nullptr;
@@ -47,7 +52,8 @@ void GoToPickedZone(MapContent& map, const CYbSEDlgBase& page, const ZoneSource&
 void ZoneName(PageForm& form, const std::string& label, CodedZoneProp& zone);
 /// The code or the polygon that a zone stands for. `zones` is what the areas are called; without a source neither
 /// shows.
-void ZoneIdentity(PageForm& form, const std::string& zones, const CodedZoneProp& zone, const ZoneSource* source);
+void ZoneIdentity(PageForm& form, const std::string& zones, const CodedZoneProp& zone, const ZoneSource* source,
+                  const std::string& codeLabel = "Grid code value:");
 /// The parent of a zone; null for one that stands elsewhere.
 const CodedZonesKvf* ZonesOf(const CodedZoneProp& zone);
 /// The map of all zones, this one standing out, where they are distributed.

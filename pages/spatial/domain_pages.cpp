@@ -87,7 +87,12 @@ void CCatchmentDlg::Describe(PageForm& form) {
       .DefaultExtension("nds2")
       .ShownWhen(fromGrid)
       .RevalidatesLater();
-  form.Button("Edit...", [this] { EditDataFile(Context(), Node(), Node().GridFile().File); }).ShownWhen(fromGrid);
+  form.Button("Edit...",
+              [this] {
+                AllowRequest(Node(), Node().GridFile().File, &EditorRequests::domain);
+                EditDataFile(Context(), Node(), Node().GridFile().File);
+              })
+      .ShownWhen(fromGrid);
   form.Button("Create...",
               [this] {
                 if (!MayCreateFile(Context())) return;

@@ -14,8 +14,7 @@ namespace tervane {
 
 namespace {
 
-constexpr ZoneSourceWords kSubcatchmentWords{.gridFilter =
-                                                 "UZ soil profile distr.files (*.nds2) |*.nds2|All Files (*.*) |*.*||"};
+constexpr ZoneSourceWords kSubcatchmentWords{.gridFilter = kZoneGridFilter};
 
 void DescribeSubcatchment(PageForm& form, CSubcatchmentPropKvf& n) {
   ZoneName(form, "Name:", n);

@@ -3,6 +3,7 @@
 #include "pages/surface/river_pages.h"
 
 #include "pages/parts/domain_map.h"
+#include "pages/parts/file_controls.h"
 #include "pages/parts/river_map.h"
 #include "simspec/conditions.h"
 #include "surface/pages.h"
@@ -90,15 +91,10 @@ class CRiverMFDlg : public PageOf<CRiverMFKvf> {
     question.title = "Create River Network File";
     question.filter = "River Network parameter file (*.FVNWK)|*.FVNWK||";
     question.defaultExtension = "FVNWK";
-    const std::string folder = n.GetRoot() ? n.GetRoot()->SetupFolder() : std::string();
-    question.current = n.Filename.IsEmpty() ? folder : n.Filename.Absolute();
-    const auto path = Outside().AskFileToSave(question);
-    if (!path) return;
-    if (const FileResult created = n.CreateNetworkFile(*path); !created.Ok()) {
-      Outside().ShowMessage(created.error, Host::Icon::Error);
-      return;
-    }
-    n.SetFilename(FileName::Picked(*path, folder));
+    const auto file = CreateFileByDialog(*this, std::move(question), n.Filename,
+                                         [&n](const std::string& path) { return n.CreateNetworkFile(path); });
+    if (!file) return;
+    n.SetFilename(*file);
     UpdateDoc(kFollowedByTree, "Create River Network File");
   }
 };

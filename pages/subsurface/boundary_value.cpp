@@ -1,0 +1,60 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/subsurface/boundary_value.h"
+
+#include "pages/parts/file_controls.h"
+#include "pages/parts/plot_content.h"
+#include "pages/parts/series_controls.h"
+
+namespace tervane {
+
+namespace {
+
+enum Way : int { kInitialValue = 0, kConstant = 1, kSeries = 2, kGridSeries = 3 };
+
+void DescribeWays(PageForm& form, const BoundaryValue& boundary, const BoundaryValue::Words& words) {
+  std::vector<std::string> texts(kBoundaryValueTypes + words.first, kBoundaryValueTypes + words.last + 1);
+  if (words.first == kConstant) texts.front() = "Constant";
+  form.Choice(
+          boundary.typeLabel, [type = &boundary.type, first = words.first] { return *type - first; },
+          [type = &boundary.type, first = words.first](int choice) { *type = choice + first; }, std::move(texts))
+      .Key("Type")
+      .ShownWhen(Is(boundary.boundary, words.boundaries))
+      .Revalidates();
+}
+
+bool HasWay(const BoundaryValue::Words& words, int way) { return way >= words.first && way <= words.last; }
+
+}  // namespace
+
+void DescribeBoundaryValue(PageForm& form, const CYbSEDlgBase& page, const BoundaryValue& boundary) {
+  for (const BoundaryValue::Words& words : boundary.words) DescribeWays(form, boundary, words);
+  std::vector<int> withGrid;
+  for (const BoundaryValue::Words& words : boundary.words) {
+    const Condition isMeant = Is(boundary.boundary, words.boundaries);
+    form.Number(words.value, boundary.value)
+        .QuantityBy(boundary.itemType)
+        .ShownWhen(isMeant && Is(boundary.type, kConstant));
+    DescribeSeriesFile(form, page, words.series, boundary.series, {boundary.value, {boundary.itemType()}},
+                       isMeant && Is(boundary.type, kSeries));
+    if (HasWay(words, kGridSeries)) withGrid.insert(withGrid.end(), words.boundaries.begin(), words.boundaries.end());
+  }
+  // A way that goes with another kind of boundary may be left from that one.
+  const Condition byGrid = Is(boundary.type, kGridSeries) && Is(boundary.boundary, withGrid);
+  form.DataFile("Time varying nds2 file:", boundary.grid)
+      .Filter(boundary.gridFilter)
+      .DefaultExtension("nds2")
+      .ShownWhen(byGrid);
+  form.Button("Edit...", [&page, grid = &boundary.grid] { EditDataFile(page.Context(), page.Node(), grid->File); })
+      .ShownWhen(byGrid);
+}
+
+void ChartOfBoundary(PageForm& form, const BoundaryValue& boundary) {
+  std::vector<int> all;
+  for (const BoundaryValue::Words& words : boundary.words)
+    all.insert(all.end(), words.boundaries.begin(), words.boundaries.end());
+  form.Chart([series = &boundary.series] { return FileChart(*series); })
+      .ShownWhen(Is(boundary.boundary, all) && Is(boundary.type, kSeries));
+}
+
+}  // namespace tervane

@@ -1,0 +1,78 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/subsurface/well_pages.h"
+
+#include "pages/parts/domain_map.h"
+#include "pages/parts/file_controls.h"
+#include "platform/files.h"
+#include "simspec/basic_parameters.h"
+#include "simspec/conditions.h"
+#include "subsurface/pages.h"
+#include "subsurface/saturated_zone.h"
+#include "subsurface/wells.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr const char* kFilter = "Well parameter file (*.WEL)|*.WEL||";
+constexpr int kFollowedByTree = kDataChanged | kTreeRebuilt;
+
+class CSZWellDlg : public PageOf<CSZWellKvf> {
+ public:
+  using PageOf::PageOf;
+
+ protected:
+  void Describe(PageForm& form) override {
+    CSZWellKvf& n = Node();
+    form.File("Filename", n.Filename).Filter(kFilter).DefaultExtension("WEL").Hint(kFollowedByTree);
+    form.Button("Edit...", [this] { Edit(); });
+    form.Button("Create...", [this] { Create(); }).Beside();
+    if (auto* zone = n.Important(kSaturatedZone))
+      form.Check("Use Fracture well option", zone->FractureWells)
+          .Of(*zone, "FractureWells")
+          .ShownWhen(WithEngine({kEngineModflowSurfact}))
+          .EnabledWhen(On(zone->Wells));
+    form.Check("Show well location map", n.IncludeMap);
+    Control& map = form.Map([&n] {
+      MapContent content = DomainMap(n);
+      for (GridLayer& grid : content.grids) grid.withLegend = false;
+      return content;
+    });
+    map.label = n.GetTitle();
+    map.ShownWhen(On(n.IncludeMap));
+  }
+
+ private:
+  void Edit() {
+    const FileName& file = Node().Filename;
+    AllowRequest(Node(), file, &EditorRequests::layers);
+    if (file.IsEmpty()) return;
+    if (!WhyNotReadable(file.Absolute()).empty())
+      Outside().ShowMessage("The pumping-well file is missing", Host::Icon::Error);
+    else if (Context().openDataFile)
+      Context().openDataFile(file.Absolute());
+  }
+
+  void Create() {
+    CSZWellKvf& n = Node();
+    Host::FileQuestion question;
+    question.title = "Create Well File";
+    question.filter = kFilter;
+    question.defaultExtension = "WEL";
+    const auto file = CreateFileByDialog(*this, std::move(question), n.Filename,
+                                         [&n](const std::string& path) { return n.CreateWellFile(path); });
+    if (!file) return;
+    n.SetFilename(*file);
+    UpdateDoc(kDataChanged, "Create Well File");
+  }
+};
+
+}  // namespace
+
+std::span<const PageRow> WellPages() {
+  static constexpr PageRow kRows[] = {PageIs<CSZWellDlg, CSZWellKvf>(kWellsPage)};
+  return kRows;
+}
+
+}  // namespace tervane

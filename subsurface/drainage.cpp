@@ -1,0 +1,82 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "subsurface/drainage.h"
+
+#include "simspec/conditions.h"
+#include "simspec/pages.h"
+#include "spatial/geo_data.h"
+#include "subsurface/pages.h"
+#include "subsurface/saturated_zone.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr KeyChoice kDrainageOptions[] = {
+    {CDrainageSZKvf::kNoDrainage, "No drainage", false},
+    {CDrainageSZKvf::kDownhill, "Drainage routed downhill based on adjacent drain levels"},
+    {CDrainageSZKvf::kByCodes, "Drainage routing based on grid codes"},
+    {CDrainageSZKvf::kDistributed, "Distributed drainage options"},
+    {CDrainageSZKvf::kRemoved, "Drainage not routed, but removed from model"}};
+
+const Data2DKind kLevel{.className = "CDrainageLevelSZKvf",
+                        .section = "Level",
+                        .title = "Level",
+                        .itemType = quantity::kElevation,
+                        .relativeToGround = Data2DKind::RelativeToGround::Off};
+const Data2DKind kTimeConstant{.className = "CDrainageTimeConstantSZKvf",
+                               .section = "TimeConstant",
+                               .title = "Time Constant",
+                               .itemType = quantity::kLeakageCoefficient};
+const Data2DKind kCodes{
+    .className = "CDrainageCodesSZKvf", .section = "DrainCode", .title = "Drain Codes", .itemType = quantity::kCode};
+const Data2DKind kOptionCodes{.className = "CDrainageDistributedSZKvf",
+                              .section = "DistributedOptionCode",
+                              .title = "Option Distribution",
+                              .itemType = quantity::kCode};
+
+const Data2DKind kDrainCells{.className = "CGeoDataWM2DKvf",
+                             .section = "Distribution",
+                             .title = "Option Distribution",
+                             .itemType = quantity::kCode,
+                             .mayLeaveCells = true};
+const Data2DKind kDrainLevel{.className = "CGeoDataWM2DKvf",
+                             .section = "Level",
+                             .title = "Level",
+                             .itemType = quantity::kElevation,
+                             .relativeToGround = Data2DKind::RelativeToGround::Off,
+                             .mayLeaveCells = true};
+
+Condition DrainageIncluded() { return OnInParent(&CSatZoneKvf::Drainage); }
+
+}  // namespace
+
+CDrainageSZKvf::CDrainageSZKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Drainage", "Drainage", parent) {
+  SetPage(kDrainagePage);
+  TakesPartWhen(OwnEngine() && DrainageIncluded());
+  NewChild<CData2DKvf>(kLevel);
+  NewChild<CData2DKvf>(kTimeConstant, !Is(DrainageOption, kNoDrainage));
+  NewChild<CData2DKvf>(kCodes, Is(DrainageOption, {kByCodes, kDistributed}));
+  NewChild<CData2DKvf>(kOptionCodes, Is(DrainageOption, kDistributed));
+}
+
+void CDrainageSZKvf::ExchangeKeys(KeyExchange& keys) {
+  constexpr int kFirstVersionHere = 8;
+  keys.Since(kFirstVersionHere)("DrainageOption", DrainageOption).OneOf(kDrainageOptions);
+}
+
+CDrainageMFSZItemKvf::CDrainageMFSZItemKvf(CYbSEKvfBase* parent)
+    : NamedItemKvf("Drainage_Modflow_Item", "Drainage_Modflow_%d", "Drain", parent) {
+  SetHelp("Top.chm", "Tvn.htm");
+  SetPage(kHelpPage);
+  NewChild<CGeoDataWM2DKvf>(kDrainCells, CGeoDataWM2DKvf::kAnyDistribution);
+  NewChild<CGeoDataWM2DKvf>(kDrainLevel, CGeoDataWM2DKvf::kAnyDistribution);
+  NewImportantChild<CTimeseriesConstKvf>(kDrainTimeConstant, quantity::kDrainageTimeConstant);
+}
+
+CDrainageMFSZKvf::CDrainageMFSZKvf(CYbSEKvfBase* parent) : CYbSEKvfListBase("Drainage", "Drainage_Modflow", parent) {
+  SetPage(kModflowDrainsPage);
+  TakesPartWhen(!OwnEngine() && DrainageIncluded());
+}
+
+}  // namespace tervane

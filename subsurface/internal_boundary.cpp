@@ -1,0 +1,122 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "subsurface/internal_boundary.h"
+
+#include "simspec/basic_parameters.h"
+#include "simspec/conditions.h"
+#include "subsurface/pages.h"
+
+namespace tervane {
+
+namespace {
+
+using Zone = CSZVerDiscrInternalBoundaryPropKvf;
+
+constexpr KeyChoice kBoundaries[] = {{Zone::kNone, "None"},
+                                     {Zone::kFixedHead, "Fixed Head"},
+                                     {Zone::kFixedHeadDrain, "Fixed Head Drain"},
+                                     {Zone::kHeadControlledFlux, "Head-Controlled Flux (GHB)"},
+                                     {Zone::kDrain, "(Reserved for future use)"},
+                                     {Zone::kRiver, "(Reserved for future use)"},
+                                     {Zone::kInactive, "Inactive Cells"}};
+constexpr const char* kValueLabels[] = {
+    "", "Head elevation", "Head elevation", "Controlling head", "Drain elevation", "River stage", ""};
+static_assert(std::size(kValueLabels) == std::size(kBoundaries));
+constexpr KeyChoice kLeakages[] = {{Zone::kConductance, "Total conductance"},
+                                   {Zone::kLeakageCoefficient, "Leakage coefficient"}};
+
+constexpr KeyChoice kSources[] = {{ZoneSource::kNone, "None"},
+                                  {ZoneSource::kGridCodes, "Grid codes (.nds2)"},
+                                  {ZoneSource::kPolygons, "Polygons (.shp)"}};
+constexpr ZoneKey kBoundaryKeys[] = {
+    {ZonePart::Number, "InternalBoundarySecNumber"}, {ZonePart::Name, "ID"}, {ZonePart::Id, "GridCode"}};
+constexpr CodedZonesKind kBoundaryZones{.className = "CSZVerDiscrInternalBoundaryKvf",
+                                        .title = "Internal Boundary Conditions",
+                                        .section = "InternalBoundary",
+                                        .source = {.types = kSources,
+                                                   .type = ZoneSource::kNone,
+                                                   .hasGapFill = false,
+                                                   .countKey = "NoInternalBoundaries",
+                                                   .mayLeaveCells = true,
+                                                   .hasGlobalZone = false},
+                                        .distribution = std::nullopt,
+                                        .makeZone = MakeZone<Zone>,
+                                        .page = &kInternalBoundariesPage};
+
+const Data2DKind kLeakageCoefficientKind{.className = "CSZVerDiscrInternalBoundaryPropLeakCoefKvf",
+                                         .section = "LeakCoef",
+                                         .title = "Leakage Coefficient",
+                                         .itemType = quantity::kLeakageCoefficient,
+                                         .mayLeaveCells = true};
+const Data2DKind kConductanceKind{.className = "CSZVerDiscrInternalBoundaryPropConducKvf",
+                                  .section = "Conductance",
+                                  .title = "Total Conductance",
+                                  .itemType = quantity::kConductance,
+                                  .mayLeaveCells = true};
+const Data2DKind kRiverBottomKind{.className = "CSZVerDiscrInternalBoundaryPropRiverBotKvf",
+                                  .section = "RiverBottomElevation",
+                                  .title = "River Bottom Elevation",
+                                  .itemType = quantity::kElevation,
+                                  .relativeToGround = Data2DKind::RelativeToGround::Off,
+                                  .mayLeaveCells = true};
+
+}  // namespace
+
+int CSZVerDiscrInternalBoundaryPropConducKvf::ValidateData() {
+  const int isValid = CData2DKvf::ValidateData();
+  if (Type == kUniform) return isValid;
+  AddError("Only fixed value allowed", "Type");
+  return 0;
+}
+
+CSZVerDiscrInternalBoundaryPropKvf::CSZVerDiscrInternalBoundaryPropKvf(CYbSEKvfBase* parent)
+    : CodedZoneProp(kBoundaryKeys, "Boundary Properties", "InternalBoundaryProp", parent),
+      seriesFile_(NewChild<CFMData0DFile>("TIME_SERIES_FILE")),
+      gridFile_(NewChild<CFMData2DNdsFile>()) {
+  SetPage(kInternalBoundaryPage);
+  const Condition hasValue = !Is(BoundaryType, {kNone, kInactive});
+  const Condition isLeaky = Is(BoundaryType, {kHeadControlledFlux, kDrain, kRiver});
+  seriesFile_->UsedWhen(hasValue && Is(Type, kSeries));
+  gridFile_->UsedWhen(hasValue && Is(Type, kGridSeries));
+  for (DataFileNode* file : {static_cast<DataFileNode*>(seriesFile_), static_cast<DataFileNode*>(gridFile_)})
+    file->SetItemTypeBy([this] { return GetBoundaryItemType(); });
+  NewChild<CData2DKvf>(kLeakageCoefficientKind, isLeaky && Is(HeadControlLeakage, kLeakageCoefficient));
+  NewChild<CSZVerDiscrInternalBoundaryPropConducKvf>(kConductanceKind, isLeaky && Is(HeadControlLeakage, kConductance));
+  NewChild<CData2DKvf>(kRiverBottomKind, Is(BoundaryType, kRiver));
+}
+
+void CSZVerDiscrInternalBoundaryPropKvf::ExchangeKeys(KeyExchange& keys) {
+  CodedZoneProp::ExchangeKeys(keys);
+  keys("FixedValue", FixedValue).Quantity(GetBoundaryItemType());
+  keys("BoundaryType", BoundaryType).OneOf(kBoundaries);
+  keys("Type", Type);
+  keys("HeadControlLeakage", HeadControlLeakage).OneOf(kLeakages);
+}
+
+void CSZVerDiscrInternalBoundaryPropKvf::SetBoundaryType(int type) {
+  BoundaryType = type;
+  if ((type == kFixedHeadDrain || type == kHeadControlledFlux) && Type > kSeries) Type = kInitialValue;
+  if ((type == kHeadControlledFlux || type == kDrain) && Type < kConstant) Type = kConstant;
+}
+
+int CSZVerDiscrInternalBoundaryPropKvf::GetBoundaryItemType() const {
+  return BoundaryType >= kFixedHead && BoundaryType <= kRiver ? quantity::kElevation : quantity::kUndefined;
+}
+
+std::string CSZVerDiscrInternalBoundaryPropKvf::GetValueLabel() const {
+  const bool isKnown = BoundaryType >= 0 && BoundaryType < static_cast<int>(std::size(kValueLabels));
+  return isKnown ? kValueLabels[BoundaryType] : "";
+}
+
+int CSZVerDiscrInternalBoundaryPropKvf::ValidateData() {
+  const int isValid = CodedZoneProp::ValidateData();
+  const auto* basics = Important(kBasicParameters);
+  if (BoundaryType != kFixedHeadDrain || !basics || basics->ModelType == kEngineTervane) return isValid;
+  AddError("Fixed head drain is only allow for Tervane", "BoundaryType");
+  return 0;
+}
+
+CSZVerDiscrInternalBoundaryKvf::CSZVerDiscrInternalBoundaryKvf(CYbSEKvfBase* parent)
+    : CodedZonesKvf(kBoundaryZones, parent) {}
+
+}  // namespace tervane

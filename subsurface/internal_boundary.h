@@ -1,0 +1,71 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Zones inside a computational layer that behave as a boundary: a fixed head, a flux that a head controls, a drain, or
+// cells that take no part.
+#pragma once
+
+#include <string>
+
+#include "spatial/geo_data.h"
+#include "spatial/zones.h"
+
+namespace tervane {
+
+/// A leakage coefficient or conductance that must be uniform.
+class CSZVerDiscrInternalBoundaryPropConducKvf : public CData2DKvf {
+ public:
+  using CData2DKvf::CData2DKvf;
+  int ValidateData() override;
+};
+
+/// A boundary: a zone with its type, and how its value is given.
+class CSZVerDiscrInternalBoundaryPropKvf : public CodedZoneProp {
+ public:
+  explicit CSZVerDiscrInternalBoundaryPropKvf(CYbSEKvfBase* parent);
+
+  enum Boundary : int {
+    kNone = 0,
+    kFixedHead = 1,
+    kFixedHeadDrain = 2,
+    kHeadControlledFlux = 3,
+    kDrain = 4,
+    kRiver = 5,
+    kInactive = 6
+  };
+  /// How the value is given, `Type`.
+  enum Value : int { kInitialValue = 0, kConstant = 1, kSeries = 2, kGridSeries = 3 };
+  enum Leakage : int { kConductance = 0, kLeakageCoefficient = 1 };
+
+  float FixedValue = 0;
+  int BoundaryType = kNone;
+  int Type = kInitialValue;
+  int HeadControlLeakage = kConductance;
+
+  CFMData0DFile& SeriesFile() const { return *seriesFile_; }
+  CFMData2DNdsFile& GridFile() const { return *gridFile_; }
+
+  /// Takes another type and corrects `Type`, so that it stands among those that go with it.
+  void SetBoundaryType(int type);
+  /// The quantity of the value.
+  int GetBoundaryItemType() const;
+  /// What the value is called; empty where there is none.
+  std::string GetValueLabel() const;
+
+  int ValidateData() override;
+
+ protected:
+  void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  CFMData0DFile* seriesFile_;
+  CFMData2DNdsFile* gridFile_;
+};
+
+/// The boundaries inside a computational layer.
+class CSZVerDiscrInternalBoundaryKvf : public CodedZonesKvf {
+ public:
+  explicit CSZVerDiscrInternalBoundaryKvf(CYbSEKvfBase* parent);
+};
+
+}  // namespace tervane
