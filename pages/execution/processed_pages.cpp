@@ -18,6 +18,7 @@
 #include "execution/processed_river.h"
 #include "forms/plots.h"
 #include "pages/parts/file_controls.h"
+#include "pages/parts/further_series.h"
 #include "pages/parts/plot_content.h"
 #include "pages/parts/section_tool.h"
 #include "platform/item_types.h"
@@ -90,10 +91,15 @@ void ReadPeriod(const CPreprocessedDataEntity& n, std::string& notice, SeriesCon
   if (notice.empty()) chart.period = {from, to};
 }
 
-SeriesContent SeriesChart(const CPreprocessedDataEntity& n) {
-  CTvnData0DFile file("TIME_SERIES_FILE", nullptr);
+/// The series that a node of the report names.
+void PutSeries(const CPreprocessedDataEntity& n, CTvnData0DFile& file) {
   file.File = FileName(n.GetFile(), {});
   file.Items = {ItemOf(n)};
+}
+
+SeriesContent SeriesChart(const CPreprocessedDataEntity& n) {
+  CTvnData0DFile file("TIME_SERIES_FILE", nullptr);
+  PutSeries(n, file);
   SeriesContent chart = FileChart(file);
   if (file.File.IsEmpty()) chart.message = kNoFile;
   std::string notice;
@@ -116,7 +122,12 @@ void DescribeSeries(PageForm& form, CPreprocessedDataEntity& n, CYbSEDlgBase& pa
     ReadPeriod(n, notice, unused);
     return notice;
   });
-  form.Chart([&n] { return SeriesChart(n); });
+  form.Chart(WithFurtherSeries([&n] { return SeriesChart(n); },
+                               [&n] {
+                                 CTvnData0DFile file("TIME_SERIES_FILE", nullptr);
+                                 PutSeries(n, file);
+                                 return OffersBeside(file, {}, {});
+                               }));
 }
 
 // ---- Grids

@@ -3,6 +3,7 @@
 #include "pages/subsurface/boundary_value.h"
 
 #include "pages/parts/file_controls.h"
+#include "pages/parts/further_series.h"
 #include "pages/parts/plot_content.h"
 #include "pages/parts/series_controls.h"
 
@@ -53,7 +54,8 @@ void ChartOfBoundary(PageForm& form, const BoundaryValue& boundary) {
   std::vector<int> all;
   for (const BoundaryValue::Words& words : boundary.words)
     all.insert(all.end(), words.boundaries.begin(), words.boundaries.end());
-  form.Chart([series = &boundary.series] { return FileChart(*series); })
+  form.Chart(WithFurtherSeries([series = &boundary.series] { return FileChart(*series); },
+                               [series = &boundary.series] { return OffersBeside(*series, {}, {}); }))
       .ShownWhen(Is(boundary.boundary, all) && Is(boundary.type, kSeries));
 }
 

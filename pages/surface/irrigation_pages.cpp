@@ -10,6 +10,7 @@
 #include "forms/map_question.h"
 #include "forms/row_fields.h"
 #include "pages/parts/create_dialogs.h"
+#include "pages/parts/further_series.h"
 #include "pages/parts/plot_content.h"
 #include "pages/parts/river_map.h"
 #include "pages/parts/series_controls.h"
@@ -289,6 +290,20 @@ SeriesContent DemandChart(const CIrrDemandPropKvf& demand) {
   return chart;
 }
 
+/// The series of one value of all other demands.
+std::vector<NamedFile> FilesOfOthers(const CIrrDemandPropKvf& demand, const DemandValue& value) {
+  std::vector<NamedFile> files;
+  const auto* owner = dynamic_cast<const CFMSEKvfBase*>(demand.GetParent());
+  if (!owner) return files;
+  for (const CFMSEKvfGroupBase* zone : ZoneItems(*owner)) {
+    const auto* other = dynamic_cast<const CIrrDemandPropKvf*>(zone);
+    if (other && other != &demand && other->TYPE == CIrrDemandPropKvf::kSeries &&
+        other->DemandType == demand.DemandType)
+      files.push_back({other->NAME, &other->FileOf(value)});
+  }
+  return files;
+}
+
 void DescribeDemand(PageForm& form, CIrrDemandPropKvf& n, CYbSEDlgBase& page) {
   using Demand = CIrrDemandPropKvf;
   ZoneName(form, "ID:", n);
@@ -303,7 +318,13 @@ void DescribeDemand(PageForm& form, CIrrDemandPropKvf& n, CYbSEDlgBase& page) {
     DescribeSeriesFile(form, page, value.fileLabel, n.FileOf(value), {n.*value.constant, {value.itemType}},
                        isAsked && Is(n.TYPE, Demand::kSeries));
   }
-  form.Chart([&n] { return DemandChart(n); }).ShownWhen(Is(n.TYPE, Demand::kSeries));
+  const auto offers = [&n] {
+    const DemandValue* own = nullptr;
+    for (const DemandValue& value : Demand::Values())
+      if (!own && value.demandType == n.DemandType) own = &value;
+    return own ? OffersBeside(n.FileOf(*own), "Other demands", FilesOfOthers(n, *own)) : std::vector<SeriesOffer>();
+  };
+  form.Chart(WithFurtherSeries([&n] { return DemandChart(n); }, offers)).ShownWhen(Is(n.TYPE, Demand::kSeries));
   PlaceOfZone(form, n);
 }
 
