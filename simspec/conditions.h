@@ -23,6 +23,9 @@ Condition Method(int CModelCompKvf::*method, int value);
 /// The same with a Modflow engine.
 Condition ModflowComponent(int CModModelCompKvf::*flag);
 Condition ModflowMethod(int CModModelCompKvf::*method, int value);
+/// Flow below ground is modelled with Modflow in one of those ways, values of `SubsurfaceMethod`, whatever the engine.
+Condition SubsurfaceIs(std::vector<int> methods);
+
 /// Water quality has a component.
 Condition WaterQualityComponent(int CModelCompWQKvf::*flag);
 /// Processes of that type are modelled in water quality, a value of `ProcessType`.

@@ -82,14 +82,26 @@ CModModelCompKvf::CModModelCompKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Model Co
   TakesPartWhen(WithEngine({kEngineModflowSurfact}));
 }
 
-int CModModelCompKvf::GetSubsurfaceModelType() {
-  VariablySaturated = subsurfaceModelType_ > 1;
-  const int engine = EngineOf(*this);
-  if (engine == kEngineModflowSurfact && VariablySaturated)
-    subsurfaceModelType_ = WithAirFlow ? 3 : 2;
-  else if (UsesModflow(*this))
-    subsurfaceModelType_ = WithCellRewetting ? 1 : 0;
+int CModModelCompKvf::SubsurfaceModelType() const {
+  if (EngineOf(*this) == kEngineModflowSurfact && subsurfaceModelType_ > kWithRewetting)
+    return WithAirFlow ? kVariablySaturatedWithAir : kVariablySaturated;
+  if (UsesModflow(*this)) return WithCellRewetting ? kWithRewetting : kWithoutRewetting;
   return subsurfaceModelType_;
+}
+
+int CModModelCompKvf::GetSubsurfaceModelType() {
+  VariablySaturated = subsurfaceModelType_ > kWithRewetting;
+  subsurfaceModelType_ = SubsurfaceModelType();
+  return subsurfaceModelType_;
+}
+
+Condition SubsurfaceIs(std::vector<int> methods) {
+  return Condition::OfKey(
+      [](const CYbSEKvfBase& node) {
+        const CModModelCompKvf& components = ModModelCompOf(node);
+        return Condition::KeyOfNode{&components, &components.subsurfaceModelType_, components.SubsurfaceModelType()};
+      },
+      std::move(methods), false);
 }
 
 void CModModelCompKvf::ChooseVariablySaturated(int choice) {

@@ -112,6 +112,8 @@ class CModModelCompKvf : public CTvnKvfBase {
   /// 0 without and 1 with cell rewetting, 2 variably saturated, 3 the same with air flow; made from the engine and the
   /// three flags, which follow it.
   int GetSubsurfaceModelType();
+  /// The same without making the flags follow.
+  int SubsurfaceModelType() const;
   /// Takes the choice between block centered (0) and variably saturated flow (1) with the engine that knows both.
   void ChooseVariablySaturated(int choice);
 
@@ -120,6 +122,7 @@ class CModModelCompKvf : public CTvnKvfBase {
   void ExchangeState(KeyExchange& keys) override;
 
  private:
+  friend Condition SubsurfaceIs(std::vector<int> methods);
   void TakeSubsurfaceModelType(int type);
 
   int subsurfaceModelType_ = 1;

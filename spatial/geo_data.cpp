@@ -2,13 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "spatial/geo_data.h"
 
+#include <fmt/format.h>
+
 #include "simspec/conditions.h"
 
 namespace tervane {
 
-namespace {
-
-Condition WithParametersBy(int distribution) {
+Condition GroundParametersBy(int distribution) {
   if (distribution == CGeoDataWM2DKvf::kAnyDistribution) return {};
   return Condition::OfKey(
       [](const CYbSEKvfBase& node) -> Condition::KeyOfNode {
@@ -20,16 +20,17 @@ Condition WithParametersBy(int distribution) {
       {distribution}, false);
 }
 
-}  // namespace
-
 CGeoDataWM2DKvf::CGeoDataWM2DKvf(Data2DKind kind, int distribution, CYbSEKvfBase* parent)
-    : CData2DKvf(std::move(kind), Component(&CModelCompKvf::WM) && WithParametersBy(distribution), parent) {}
+    : JudgedData2DKvf(std::move(kind), Component(&CModelCompKvf::WM) && GroundParametersBy(distribution), parent) {}
 
-int CGeoDataWM2DKvf::ValidateData() {
+int JudgedData2DKvf::ValidateData() {
   const int isValid = CData2DKvf::ValidateData();
   if (CYbSEKvfBase* parent = GetParent()) parent->ValidateData();
-  if (!HasErrorText()) return isValid;
-  AddError(errorText_);
+  if (!HasValidationMessage()) return isValid;
+  // Beside the text, which is the same for all, stand the parent's name and its own.
+  const CYbSEKvfBase* parent = GetParent();
+  const std::string place = parent ? parent->GetAbbreviatedTitle() : std::string();
+  AddError(message_, "FixedValue", place.empty() ? GetTitle() : fmt::format("{}, {}", place, GetTitle()));
   return 0;
 }
 

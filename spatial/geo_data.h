@@ -25,21 +25,33 @@ class CTvn2DKvfValidationAbstract {
  public:
   virtual ~CTvn2DKvfValidationAbstract() = default;
   /// What the parent finds wrong; empty where nothing is.
-  virtual void SetErrorText(std::string text) { errorText_ = std::move(text); }
-  virtual bool HasErrorText() const { return !errorText_.empty(); }
+  virtual void SetValidationMessage(std::string message) { message_ = std::move(message); }
+  virtual bool HasValidationMessage() const { return !message_.empty(); }
+  /// The value that the parent looks at: the uniform one.
+  virtual float GetValidationValue() const = 0;
 
  protected:
-  std::string errorText_;
+  std::string message_;
 };
 
+/// Such a quantity over the model area.
+class JudgedData2DKvf : public CData2DKvf, public CTvn2DKvfValidationAbstract {
+ public:
+  using CData2DKvf::CData2DKvf;
+
+  float GetValidationValue() const override { return FixedValue; }
+  int ValidateData() override;
+};
+
+/// `TypeOfGeoParaDistribution` has that value; as in a new setup where there is no saturated zone.
+Condition GroundParametersBy(int distribution);
+
 /// A quantity of water movement.
-class CGeoDataWM2DKvf : public CData2DKvf, public CTvn2DKvfValidationAbstract {
+class CGeoDataWM2DKvf : public JudgedData2DKvf {
  public:
   static constexpr int kAnyDistribution = -1;
   /// It takes part while `TypeOfGeoParaDistribution` has that value.
   CGeoDataWM2DKvf(Data2DKind kind, int distribution, CYbSEKvfBase* parent);
-
-  int ValidateData() override;
 };
 
 }  // namespace tervane

@@ -2,29 +2,64 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "subsurface/saturated_zone.h"
 
+#include "simspec/basic_parameters.h"
 #include "simspec/conditions.h"
 #include "subsurface/drainage.h"
+#include "subsurface/geology.h"
 #include "subsurface/pages.h"
 #include "subsurface/wells.h"
 
 namespace tervane {
+
+namespace {
+
+using Zone = CSatZoneKvf;
+
+constexpr KeyChoice kDispersions[] = {
+    {Zone::kNoDispersion, "No Dispersion"}, {Zone::kIsotropy, "Isotropy"}, {Zone::kAnisotropy, "Anisotropy"}};
+constexpr KeyChoice kParameters[] = {{Zone::kByLayers, "Assign parameters via geological layers"},
+                                     {Zone::kByUnits, "Assign parameters via geological units within layers"}};
+constexpr KeyChoice kDiscretizations[] = {{Zone::kAsGeology, "Defined by geological layers"},
+                                          {Zone::kUniform, "Uniform vertical discretization"},
+                                          {Zone::kExplicitLevels, "Explicit definition of lower levels"}};
+constexpr KeyChoice kAmbientHeads[] = {{Zone::kHydrostatic, "Assume hydrostatic equilibrium"},
+                                       {Zone::kDistributedHead, "Assign distributed values"}};
+constexpr KeyChoice kRelativePermeabilities[] = {{Zone::kVanGenuchten, "Van Genuchten"},
+                                                 {Zone::kBrooksCorey, "Brooks-Corey"}};
+
+const Data2DKind kAirFlowHead{.className = "CGeoDataMod2DZWTKvf",
+                              .section = "HeadElevationUsedForAirFlow",
+                              .title = "Head elevation used as ref. for air flow simulation",
+                              .itemType = quantity::kElevation};
+
+}  // namespace
 
 CSatZoneKvf::CSatZoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Saturated Zone", "SaturatedZone", parent) {
   SetPage(kSaturatedZonePage);
   TakesPartWhen(
       (OwnEngine() && Component(&CModelCompKvf::SZ) && !Method(&CModelCompKvf::SZ_ModelType, kLinearReservoir)) ||
       (AnyModflow() && ModflowComponent(&CModModelCompKvf::Subsurface)));
+  NewChild<CGeoUnitsSZListKvf>();
+  NewImportantChild<CGeoLayerSZKvf>(kGeologicalLayers);
+  NewImportantChild<CGeoLenseSZKvf>(kGeologicalLenses);
   NewImportantChild<CDrainageSZKvf>(kDrainage);
   NewImportantChild<CDrainageMFSZKvf>(kModflowDrains);
   NewImportantChild<CSZWellKvf>(kWells, Wells);
+  NewChild<CData2DKvf>(kAirFlowHead, AirFlowModelled() && Is(TypeAmbientWaterHeadInput, kHydrostatic));
+}
+
+const std::string& CSatZoneKvf::GetTitle() const {
+  static const std::string withModflow = "Subsurface";
+  const auto* basics = Important(kBasicParameters);
+  return basics && basics->ModelType != kEngineTervane ? withModflow : CYbSEKvfBase::GetTitle();
 }
 
 void CSatZoneKvf::ExchangeKeys(KeyExchange& keys) {
   keys("DispersionOption", DispersionOption).OneOf(kDispersions);
   constexpr int kLastVersionWithOption = 7;
   keys.Since(kLastVersionWithOption + 1)("Drainage", Drainage);
-  keys("TypeOfGeoParaDistribution", ParameterDistribution).OneOf(kGroundParameterDistributions);
-  keys("TypeOfVerDiscr", TypeOfVerDiscr).OneOf(kVerticalDiscretizations);
+  keys("TypeOfGeoParaDistribution", ParameterDistribution).OneOf(kParameters);
+  keys("TypeOfVerDiscr", TypeOfVerDiscr).OneOf(kDiscretizations);
   keys("Wells", Wells);
   keys("FractureWells", FractureWells);
   keys("MimimumLayerThickness", MimimumLayerThickness).Quantity(quantity::kLayerThickness);

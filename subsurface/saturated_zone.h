@@ -8,33 +8,32 @@
 
 namespace tervane {
 
-inline constexpr KeyChoice kDispersions[] = {{0, "No Dispersion"}, {1, "Isotropy"}, {2, "Anisotropy"}};
-inline constexpr KeyChoice kGroundParameterDistributions[] = {
-    {0, "Assign parameters via geological layers"}, {1, "Assign parameters via geological units within layers"}};
-inline constexpr KeyChoice kVerticalDiscretizations[] = {{0, "Defined by geological layers"},
-                                                         {1, "Uniform vertical discretization"},
-                                                         {2, "Explicit definition of lower levels"}};
-inline constexpr KeyChoice kAmbientHeads[] = {{0, "Assume hydrostatic equilibrium"}, {1, "Assign distributed values"}};
-inline constexpr KeyChoice kRelativePermeabilities[] = {{0, "Van Genuchten"}, {1, "Brooks-Corey"}};
-
 /// Flags are 0 or 1.
 class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution {
  public:
   explicit CSatZoneKvf(CYbSEKvfBase* parent);
 
-  int DispersionOption = 0;
+  enum Dispersion : int { kNoDispersion = 0, kIsotropy = 1, kAnisotropy = 2 };
+  enum Parameters : int { kByLayers = 0, kByUnits = 1 };
+  enum Discretization : int { kAsGeology = 0, kUniform = 1, kExplicitLevels = 2 };
+  enum AmbientHead : int { kHydrostatic = 0, kDistributedHead = 1 };
+  enum RelativePermeability : int { kVanGenuchten = 0, kBrooksCorey = 1 };
+
+  int DispersionOption = kNoDispersion;
   int Drainage = 0;
-  int ParameterDistribution = 0;  ///< `TypeOfGeoParaDistribution`.
-  int TypeOfVerDiscr = 0;
+  int ParameterDistribution = kByLayers;  ///< `TypeOfGeoParaDistribution`.
+  int TypeOfVerDiscr = kAsGeology;
   int Wells = 0;
   int FractureWells = 0;
   float MimimumLayerThickness = 0.5f;
   int id = 1;  ///< What the next geological layer is numbered; it only grows.
-  int TypeAmbientWaterHeadInput = 0;
-  int TypeOfRelPerm = 0;
+  int TypeAmbientWaterHeadInput = kHydrostatic;
+  int TypeOfRelPerm = kVanGenuchten;
   int Threshold = 0;
   int MassTransferToImmobileWater = 0;
 
+  /// With a Modflow engine the zone is called another name.
+  const std::string& GetTitle() const override;
   const int& TypeOfGeoParaDistribution() const override { return ParameterDistribution; }
 
  protected:

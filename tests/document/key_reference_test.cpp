@@ -124,18 +124,18 @@ void Change(KvfFile& file, KvfParam& param) {
 
 /// Keys that follow from others, so that a changed value is not kept as it is.
 bool IsDerived(const std::string& key) {
-  for (const char* derived :
-       {"IsDataUsedInSetup", "FlowModelDocVersion:Version", "YbSEKvfListItemCount",
-        // Counts 0 or 1 instead of 2 items, the others are then unread.
-        "ExtraParams:NoOfParams", ":NO_", "NumberOfSources", "Riverlinks:Noofreaches", "NO_TIMESERIES", "ITEM_COUNT",
-        // Of the zone's identity and place.
-        ":GRIDCODE", "ProfileSecNumber", ":AreaCode", ":DemandCode",
-        // Of other keys of the source.
-        ":RS_6", ":RS_7", "Source1:TYPE",
-        // A kind of value that the file's value has not.
-        "ExtraParam_1:Type", "ExtraParam_2:Type",
-        // A zero area and an area of which the file says that it is undefined are the same.
-        "ZoomDataArea"})
+  for (const char* derived : {"IsDataUsedInSetup", "FlowModelDocVersion:Version", "YbSEKvfListItemCount",
+                              // Counts 0 or 1 instead of 2 items, the others are then unread.
+                              "ExtraParams:NoOfParams", ":NO_", "NumberOfSources", "Riverlinks:Noofreaches",
+                              "NO_TIMESERIES", "ITEM_COUNT", ":NumberOf", ":NoInternal",
+                              // Of the zone's identity and place.
+                              ":GRIDCODE", "ProfileSecNumber", ":AreaCode", ":DemandCode",
+                              // Of other keys of the source.
+                              ":RS_6", ":RS_7", "Source1:TYPE",
+                              // A kind of value that the file's value has not.
+                              "ExtraParam_1:Type", "ExtraParam_2:Type",
+                              // A zero area and an area of which the file says that it is undefined are the same.
+                              "ZoomDataArea"})
     if (key.find(derived) != std::string::npos) return true;
   return false;
 }
@@ -159,27 +159,36 @@ TEST(KeyReference, EveryKeyOfEveryNodeIsReadBackAsItWasWritten) {
   KvfFile* file = document.BuildFile("/data");
   std::vector<std::pair<std::string, KvfNode*>> keys;
   CollectKeys(*AsSection(file->top.firstChild), {}, keys);
-  int changed = 0;
-  for (auto& [key, node] : keys) {
-    if (IsDerived(key)) continue;
-    const std::vector<KvfParam> before(node->params, node->params + node->count);
-    for (std::uint32_t i = 0; i < node->count; ++i)
-      // Of a date only the year, so that it stays one.
-      if (node->count == 1 || i == 0) Change(*file, node->params[i]);
-    const std::string value = PlainValuesText(*node);
+  std::erase_if(keys, [](const auto& key) { return IsDerived(key.first); });
+  EXPECT_GT(keys.size(), 150U);
+  // Keys that stand far apart in the file are changed together, so that it is read some ten times and not a thousand.
+  constexpr std::size_t kTogether = 61;
+  for (std::size_t first = 0; first < std::min(kTogether, keys.size()); ++first) {
+    std::vector<std::vector<KvfParam>> before;
+    std::string changed;
+    for (std::size_t k = first; k < keys.size(); k += kTogether) {
+      KvfNode* node = keys[k].second;
+      before.emplace_back(node->params, node->params + node->count);
+      for (std::uint32_t i = 0; i < node->count; ++i)
+        // Of a date only the year, so that it stays one.
+        if (node->count == 1 || i == 0) Change(*file, node->params[i]);
+      changed += " " + keys[k].first;
+    }
     std::string text, error;
     ASSERT_TRUE(WriteKvfText(*file, text, error)) << error;
     CFlowModelDoc reopened;
     ASSERT_TRUE(reopened.OpenText(text, "/data/a.tvd")) << reopened.Error();
-    EXPECT_TRUE(reopened.Report().unread.empty()) << key;
-    // A hot start date needs all its five numbers.
-    if (key.find("HotStartDate") == std::string::npos || node->count == 1) {
-      EXPECT_EQ(ValueOf(reopened, key), value) << key;
+    EXPECT_TRUE(reopened.Report().unread.empty()) << changed;
+    for (std::size_t k = first; k < keys.size(); k += kTogether) {
+      const auto& [key, node] = keys[k];
+      // A hot start date needs all its five numbers.
+      if (key.find("HotStartDate") == std::string::npos || node->count == 1) {
+        EXPECT_EQ(ValueOf(reopened, key), PlainValuesText(*node)) << key;
+      }
+      const std::vector<KvfParam>& old = before[(k - first) / kTogether];
+      std::copy(old.begin(), old.end(), node->params);
     }
-    std::copy(before.begin(), before.end(), node->params);
-    ++changed;
   }
-  EXPECT_GT(changed, 150);
   kvfClose(&file);
 }
 

@@ -27,7 +27,7 @@ class Layer : public CTvnKvfBase, public GroundParameterDistribution {
   const int& TypeOfGeoParaDistribution() const override { return type; }
   int ValidateData() override {
     const bool isWrong = always->FixedValue > 1;
-    always->SetErrorText(isWrong ? "Too much" : "");
+    always->SetValidationMessage(isWrong ? "Too much" : "");
     if (isWrong) AddError("A quantity is too much");
     return !isWrong;
   }

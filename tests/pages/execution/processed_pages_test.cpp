@@ -181,9 +181,9 @@ TEST(ProcessedPages, ALineOnTheMapShowsTheLayersBelowTheTopographyOfTheReport) {
   EXPECT_EQ(Summary(content),
             "section of 10000 m: ground, Computational Layer 1, Computational Layer 2, Computational Layer 3");
   // From the top down, as the pages count them.
-  EXPECT_NEAR(content.ground->Value(24, 18), 42, 3);
-  EXPECT_NEAR(content.surfaces[0].bottom->Value(24, 18), -30, 1);
-  EXPECT_NEAR(content.surfaces[2].bottom->Value(24, 18), -90, 1);
+  EXPECT_NEAR(content.ground->grid->Value(24, 18), 42, 3);
+  EXPECT_NEAR(content.surfaces[0].bottom.grid->Value(24, 18), -30, 1);
+  EXPECT_NEAR(content.surfaces[2].bottom.grid->Value(24, 18), -90, 1);
   page->Press(control(ControlKind::Button, "Remove Section"));
   EXPECT_FALSE(section.IsShown());
   EXPECT_TRUE(map().lines.empty());
