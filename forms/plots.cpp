@@ -30,7 +30,9 @@ bool LooksSame(const MapContent& a, const MapContent& b) {
 }
 
 bool LooksSame(const SectionContent& a, const SectionContent& b) {
-  return a.line == b.line && a.ground == b.ground && a.surfaces == b.surfaces && a.message == b.message;
+  return a.line == b.line && a.ground == b.ground && a.surfaces == b.surfaces && a.lenses == b.lenses &&
+         a.curves == b.curves && a.screens == b.screens && SameNumber(a.screenReach, b.screenReach) &&
+         SameNumber(a.minimumThickness, b.minimumThickness) && a.message == b.message;
 }
 
 namespace {
@@ -105,6 +107,9 @@ std::string Summary(const SectionContent& content) {
   if (content.IsEmpty()) return content.message;
   std::vector<std::string> names{"ground"};
   for (const SectionSurface& surface : content.surfaces) names.push_back(surface.name);
+  for (const SectionLens& lens : content.lenses) names.push_back(lens.name);
+  for (const SectionCurve& curve : content.curves) names.push_back(curve.name);
+  if (!content.screens.empty()) names.push_back(fmt::format("{} screens", content.screens.size()));
   return fmt::format("section of {:.0f} m: {}", LengthOf(content.line), fmt::join(names, ", "));
 }
 

@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "geometry/grid.h"
+#include "geometry/level.h"
 #include "geometry/shapes.h"
 #include "platform/computation.h"
 #include "platform/dates.h"
@@ -156,18 +157,50 @@ void LetStandOut(MapContent& map, const Highlight& highlighted);
 /// A surface of a section: elevations in the grid's unit.
 struct SectionSurface {
   std::string name;  ///< Of what lies between it and the surface above.
-  std::shared_ptr<const CTvn2DOrthoRotatedGridData> bottom;
+  Level bottom;
   std::optional<unsigned> color = {};  ///< Red, green, blue; one of the program's when nothing is said.
 
   bool operator==(const SectionSurface&) const = default;
 };
 
+/// A body inside the layers, where its extent has a value other than 0; everywhere without an extent.
+struct SectionLens {
+  std::string name;
+  Level top, bottom;
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> extent = nullptr;
+
+  bool operator==(const SectionLens&) const = default;
+};
+
+/// A level that is drawn as a line: a head, the bottom of a computational layer.
+struct SectionCurve {
+  std::string name;
+  Level level;
+  bool isDashed = false;
+
+  bool operator==(const SectionCurve&) const = default;
+};
+
+/// A stretch of a well, which is shown where the section passes near it.
+struct SectionScreen {
+  std::string name;
+  MapPoint place;
+  double top = 0, bottom = 0;  ///< Elevations in metres.
+
+  bool operator==(const SectionScreen&) const = default;
+};
+
 /// A cut through the ground along a line of the map.
 struct SectionContent {
   std::vector<MapPoint> line;  ///< None while the user has drawn none.
-  std::shared_ptr<const CTvn2DOrthoRotatedGridData> ground;
+  std::optional<Level> ground;
   std::vector<SectionSurface> surfaces;  ///< From the top down.
-  std::string message;                   ///< Shown in the place of a section that has nothing to show.
+  std::vector<SectionLens> lenses = {};
+  std::vector<SectionCurve> curves = {};
+  std::vector<SectionScreen> screens = {};
+  double screenReach = 0;       ///< In metres: how far from the line a screen is shown.
+  double minimumThickness = 0;  ///< In metres: layers that are thinner are marked, as are levels that cross.
+  std::string message;          ///< Shown in the place of a section that has nothing to show.
   Awaited awaited = {};
 
   bool IsEmpty() const { return line.size() < 2 || !ground || surfaces.empty(); }

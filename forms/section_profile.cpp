@@ -6,20 +6,46 @@
 #include <cmath>
 #include <limits>
 
-#include "platform/units.h"
-
 namespace tervane {
 
 namespace {
 
-std::vector<double> ElevationsAlong(const CTvn2DOrthoRotatedGridData& grid, const std::vector<SectionPoint>& points) {
-  std::vector<double> values = ValuesAlong(grid, points, GridSampling::Bilinear);
-  constexpr int kMetre = 1000;
-  const Unit *unit = FindUnit(grid.ItemUnit()), *metre = FindUnit(kMetre);
-  const auto toMetres = unit ? ConversionBetween(unit->scale, metre->scale) : std::nullopt;
-  if (toMetres)
-    for (double& value : values) value = (*toMetres)(value);
-  return values;
+constexpr double kNone = std::numeric_limits<double>::quiet_NaN();
+
+SectionProfile::Lens LensAlong(const SectionLens& lens, const SectionProfile& profile) {
+  SectionProfile::Lens shown{lens.name, ElevationsAlong(lens.top, profile.points, profile.ground),
+                             ElevationsAlong(lens.bottom, profile.points, profile.ground)};
+  std::vector<double> extent;
+  if (lens.extent) extent = ValuesAlong(*lens.extent, profile.points, GridSampling::Nearest);
+  for (std::size_t i = 0; i < shown.top.size(); ++i) {
+    const bool isThere = extent.empty() || (!std::isnan(extent[i]) && extent[i] != 0);
+    if (!isThere || !(shown.top[i] > shown.bottom[i])) shown.top[i] = shown.bottom[i] = kNone;
+  }
+  return shown;
+}
+
+/// The screens that lie within reach of the line.
+std::vector<SectionProfile::Screen> ScreensAlong(const SectionContent& content) {
+  std::vector<SectionProfile::Screen> shown;
+  for (const SectionScreen& screen : content.screens) {
+    double nearest = content.screenReach, at = kNone, before = 0;
+    for (std::size_t i = 1; i < content.line.size(); ++i) {
+      const MapPoint from = content.line[i - 1], to = content.line[i];
+      const double dx = to.x - from.x, dy = to.y - from.y, length = std::hypot(dx, dy);
+      if (!(length > 0)) continue;
+      const double along = ((screen.place.x - from.x) * dx + (screen.place.y - from.y) * dy) / (length * length);
+      const double part = std::clamp(along, 0.0, 1.0);
+      const double away = std::hypot(from.x + part * dx - screen.place.x, from.y + part * dy - screen.place.y);
+      if (away <= nearest) {
+        nearest = away;
+        at = before + part * length;
+      }
+      before += length;
+    }
+    if (!std::isnan(at)) shown.push_back({screen.name, at, screen.top, screen.bottom});
+  }
+  std::ranges::stable_sort(shown, {}, &SectionProfile::Screen::distance);
+  return shown;
 }
 
 }  // namespace
@@ -28,25 +54,44 @@ SectionProfile ProfileOf(const SectionContent& content, double step) {
   SectionProfile profile;
   if (content.IsEmpty()) return profile;
   profile.points = PointsAlong(content.line, step);
-  profile.ground = ElevationsAlong(*content.ground, profile.points);
+  profile.ground = ElevationsAlong(*content.ground, profile.points, std::vector<double>(profile.points.size(), kNone));
   std::vector<double> above = profile.ground;
   for (const SectionSurface& surface : content.surfaces) {
-    SectionProfile::Band band{surface.name, above, ElevationsAlong(*surface.bottom, profile.points)};
+    SectionProfile::Band band{surface.name, above, ElevationsAlong(surface.bottom, profile.points, profile.ground)};
+    band.crossing = band.thin = std::vector<double>(above.size(), kNone);
     for (std::size_t i = 0; i < above.size(); ++i) {
       if (std::isnan(band.bottom[i])) continue;
-      if (!std::isnan(above[i])) band.bottom[i] = std::min(band.bottom[i], above[i]);
+      if (!std::isnan(above[i])) {
+        const bool isCrossing = band.bottom[i] > above[i];
+        band.bottom[i] = std::min(band.bottom[i], above[i]);
+        if (isCrossing)
+          band.crossing[i] = band.bottom[i];
+        else if (above[i] - band.bottom[i] < content.minimumThickness)
+          band.thin[i] = band.bottom[i];
+      }
       above[i] = band.bottom[i];
     }
     profile.bands.push_back(std::move(band));
   }
+  for (const SectionLens& lens : content.lenses) profile.lenses.push_back(LensAlong(lens, profile));
+  for (const SectionCurve& curve : content.curves)
+    profile.curves.push_back({curve.name, ElevationsAlong(curve.level, profile.points, profile.ground)});
+  profile.screens = ScreensAlong(content);
   return profile;
 }
 
 double StepFor(const SectionContent& content) {
-  constexpr double kMostPoints = 4000, kPointsInCell = 4;
-  double cell = content.ground ? content.ground->Geometry().cellSize : 1;
-  for (const SectionSurface& surface : content.surfaces) cell = std::min(cell, surface.bottom->Geometry().cellSize);
-  return std::max({LengthOf(content.line) / kMostPoints, cell / kPointsInCell, std::numeric_limits<double>::min()});
+  constexpr double kMostPoints = 4000, kPointsInCell = 4, kLeastCells = 50;
+  const double length = LengthOf(content.line);
+  double cell = length / kLeastCells;
+  const auto look = [&cell](const Level& level) {
+    if (level.grid) cell = std::min(cell, level.grid->Geometry().cellSize);
+  };
+  if (content.ground) look(*content.ground);
+  for (const SectionSurface& surface : content.surfaces) look(surface.bottom);
+  for (const SectionLens& lens : content.lenses) look(lens.top), look(lens.bottom);
+  for (const SectionCurve& curve : content.curves) look(curve.level);
+  return std::max({length / kMostPoints, cell / kPointsInCell, std::numeric_limits<double>::min()});
 }
 
 std::optional<std::pair<double, double>> SectionProfile::Range(double from, double to) const {
@@ -60,6 +105,11 @@ std::optional<std::pair<double, double>> SectionProfile::Range(double from, doub
   };
   add(ground);
   for (const Band& band : bands) add(band.bottom);
+  for (const Lens& lens : lenses) add(lens.top), add(lens.bottom);
+  for (const Curve& curve : curves) add(curve.heights);
+  for (const Screen& screen : screens)
+    if (range && screen.distance >= from && screen.distance <= to)
+      range = {std::min(range->first, screen.bottom), std::max(range->second, screen.top)};
   return range;
 }
 

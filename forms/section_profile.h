@@ -21,11 +21,29 @@ struct SectionProfile {
   struct Band {
     std::string name;
     std::vector<double> top, bottom;
+    std::vector<double> crossing = {};  ///< The bottom where it was meant to lie above the top; else NaN.
+    std::vector<double> thin = {};      ///< The bottom where the layer is thinner than it should be; else NaN.
+  };
+  struct Lens {
+    std::string name;
+    std::vector<double> top, bottom;  ///< NaN where the lens is not.
+  };
+  struct Curve {
+    std::string name;
+    std::vector<double> heights;
+  };
+  /// A screen near the line, at the nearest point of it.
+  struct Screen {
+    std::string name;
+    double distance, top, bottom;
   };
 
   std::vector<SectionPoint> points;
   std::vector<double> ground;
   std::vector<Band> bands;  ///< From the top down.
+  std::vector<Lens> lenses;
+  std::vector<Curve> curves;
+  std::vector<Screen> screens;  ///< From the start of the line on.
 
   /// The lowest and highest elevation between two distances; nothing where there is none.
   std::optional<std::pair<double, double>> Range(double from, double to) const;

@@ -299,10 +299,11 @@ SectionContent CPreprocessedNDS3_PLOTDlg::Section() const {
     if (map.grids.empty() && !map.message.empty()) section.message = map.message;
     return map.grids.empty() ? nullptr : map.grids.front().grid;
   };
-  section.ground = take(GridFileMap(*topography, topography->GetFile(), topography->GetNumber("ItemNo")));
+  if (auto ground = take(GridFileMap(*topography, topography->GetFile(), topography->GetNumber("ItemNo"))))
+    section.ground = Level{std::move(ground)};
   for (int layer = 1; layer <= layers_; ++layer)
     if (auto bottom = take(GridFileMap(Node(), Node().GetFile(), ItemOf(Node()), {0, layers_ - layer})))
-      section.surfaces.push_back({fmt::format("Computational Layer {}", layer), std::move(bottom)});
+      section.surfaces.push_back({fmt::format("Computational Layer {}", layer), {std::move(bottom)}});
   return section;
 }
 

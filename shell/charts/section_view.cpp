@@ -46,9 +46,8 @@ SectionView::SectionView(Host& host, QWidget* parent)
   message_->setAutoFillBackground(true);
   message_->setBackgroundRole(QPalette::Base);
   Hold({chart_, [this](double factor) { Zoom(factor); }, [this] { Fit(); },
-        [this](double pixelRatio) {
-          return chart_->toPixmap(chart_->width(), chart_->height(), pixelRatio).toImage();
-        }});
+        [this](double pixelRatio) { return chart_->toPixmap(chart_->width(), chart_->height(), pixelRatio).toImage(); },
+        [this] { return Values(); }});
   choice_->addItem(QString());
   for (const int times : kExaggerations) choice_->addItem(QString::fromUtf8("%1 ×").arg(times), times);
   choice_->setToolTip(tr("How many times heights are drawn larger than distances"));
@@ -97,30 +96,25 @@ void SectionView::Build() {
   chart_->clearPlottables();
   chart_->clearItems();
   bands_.clear();
-  ground_ = nullptr;
+  lenses_.clear();
+  curves_.clear();
+  screens_.clear();
+  screenNames_.clear();
+  ground_ = crossing_ = thin_ = nullptr;
   pointer_ = nullptr;
   profile_ = ProfileOf(content_, StepFor(content_));
   message_->setText(content_.message.empty() ? tr("There is nothing to show.") : Translated(content_.message));
   message_->setVisible(content_.IsEmpty());
   choice_->setEnabled(!content_.IsEmpty());
   if (!content_.IsEmpty()) {
-    const auto shown = [](const ShownUnit& unit, std::vector<double> values) {
-      for (double& value : values) value = unit.Shown(value);
-      return values;
-    };
-    std::vector<double> distances;
-    for (const SectionPoint& point : profile_.points) distances.push_back(units_->distance.Shown(point.distance));
-    for (const SectionProfile::Band& band : profile_.bands) {
-      auto* drawn = new BandPlottable(chart_->xAxis, chart_->yAxis);
-      drawn->SetData(distances, shown(units_->height, band.top), shown(units_->height, band.bottom));
-      drawn->setName(ToQt(band.name));
-      bands_.push_back(drawn);
-    }
-    const std::vector<double> ground = shown(units_->height, profile_.ground);
-    ground_ = chart_->addGraph();
-    ground_->setData(QVector<double>(distances.begin(), distances.end()), QVector<double>(ground.begin(), ground.end()),
-                     true);
-    ground_->setName(tr("Ground"));
+    for (const SectionProfile::Band& band : profile_.bands) bands_.push_back(AddBand(band.name, band.top, band.bottom));
+    for (const SectionProfile::Lens& lens : profile_.lenses)
+      lenses_.push_back(AddBand(lens.name, lens.top, lens.bottom));
+    for (const SectionProfile::Curve& curve : profile_.curves)
+      curves_.push_back(AddLine(ToQt(curve.name), curve.heights));
+    ground_ = AddLine(tr("Ground"), profile_.ground);
+    AddMarks();
+    AddScreens();
     pointer_ = new QCPItemStraightLine(chart_);
     pointer_->setLayer(kPointerLayer);
     pointer_->setVisible(false);
@@ -139,6 +133,93 @@ void SectionView::Build() {
   Fit();
 }
 
+BandPlottable* SectionView::AddBand(const std::string& name, const std::vector<double>& top,
+                                    const std::vector<double>& bottom) {
+  const auto shown = [](const ShownUnit& unit, std::vector<double> values) {
+    for (double& value : values) value = unit.Shown(value);
+    return values;
+  };
+  std::vector<double> distances;
+  for (const SectionPoint& point : profile_.points) distances.push_back(units_->distance.Shown(point.distance));
+  auto* band = new BandPlottable(chart_->xAxis, chart_->yAxis);
+  band->SetData(std::move(distances), shown(units_->height, top), shown(units_->height, bottom));
+  band->setName(ToQt(name));
+  return band;
+}
+
+QCPGraph* SectionView::AddLine(const QString& name, const std::vector<double>& heights) {
+  QVector<double> distances, shown;
+  for (const SectionPoint& point : profile_.points) distances.push_back(units_->distance.Shown(point.distance));
+  for (const double height : heights) shown.push_back(units_->height.Shown(height));
+  QCPGraph* line = chart_->addGraph();
+  line->setData(distances, shown, true);
+  line->setName(name);
+  return line;
+}
+
+/// Marks run along the bottoms of layers; what no layer needs has no place in the legend.
+void SectionView::AddMarks() {
+  const auto add = [this](const QString& name, std::vector<double> SectionProfile::Band::*marks) -> QCPGraph* {
+    std::vector<std::pair<double, double>> places;
+    for (const SectionProfile::Band& band : profile_.bands) {
+      bool wasThere = false;
+      for (std::size_t i = 0; i < (band.*marks).size(); ++i) {
+        const bool isThere = !std::isnan((band.*marks)[i]);
+        if (isThere || wasThere) places.emplace_back(profile_.points[i].distance, (band.*marks)[i]);
+        wasThere = isThere;
+      }
+      if (wasThere) places.emplace_back(profile_.points.back().distance, std::nan(""));
+    }
+    if (places.empty()) return nullptr;
+    QVector<double> distances, heights;
+    for (const auto& [distance, height] : places) {
+      distances.push_back(units_->distance.Shown(distance));
+      heights.push_back(units_->height.Shown(height));
+    }
+    QCPGraph* graph = chart_->addGraph();
+    graph->setLineStyle(QCPGraph::lsNone);
+    graph->setData(distances, heights);
+    graph->setName(name);
+    return graph;
+  };
+  crossing_ = add(tr("Levels cross"), &SectionProfile::Band::crossing);
+  thin_ = add(tr("Thinner than %1").arg(units_->height.Value(content_.minimumThickness)), &SectionProfile::Band::thin);
+}
+
+void SectionView::AddScreens() {
+  for (const SectionProfile::Screen& screen : profile_.screens) {
+    const double at = units_->distance.Shown(screen.distance);
+    auto* line = new QCPItemLine(chart_);
+    line->start->setCoords(at, units_->height.Shown(screen.top));
+    line->end->setCoords(at, units_->height.Shown(screen.bottom));
+    screens_.push_back(line);
+    auto* name = new QCPItemText(chart_);
+    name->position->setCoords(at, units_->height.Shown(screen.top));
+    name->setPositionAlignment(Qt::AlignBottom | Qt::AlignHCenter);
+    name->setText(ToQt(screen.name));
+    screenNames_.push_back(name);
+  }
+}
+
+QString SectionView::Values() const {
+  QStringList heads{tr("Distance [m]"), tr("X"), tr("Y"), tr("Ground [m]")};
+  for (const SectionProfile::Band& band : profile_.bands) heads << tr("%1, bottom [m]").arg(ToQt(band.name));
+  for (const SectionProfile::Lens& lens : profile_.lenses)
+    heads << tr("%1, top [m]").arg(ToQt(lens.name)) << tr("%1, bottom [m]").arg(ToQt(lens.name));
+  for (const SectionProfile::Curve& curve : profile_.curves) heads << tr("%1 [m]").arg(ToQt(curve.name));
+  QString text = heads.join('\t') + '\n';
+  const auto number = [](double value) { return std::isnan(value) ? QString() : ToQt(FormatNumber(value, "%.10g")); };
+  for (std::size_t i = 0; i < profile_.points.size(); ++i) {
+    const SectionPoint& point = profile_.points[i];
+    QStringList row{number(point.distance), number(point.place.x), number(point.place.y), number(profile_.ground[i])};
+    for (const SectionProfile::Band& band : profile_.bands) row << number(band.bottom[i]);
+    for (const SectionProfile::Lens& lens : profile_.lenses) row << number(lens.top[i]) << number(lens.bottom[i]);
+    for (const SectionProfile::Curve& curve : profile_.curves) row << number(curve.heights[i]);
+    text += row.join('\t') + '\n';
+  }
+  return text;
+}
+
 void SectionView::ApplyTheme() {
   StyleChart(*chart_);
   const Theme& theme = Theme::Get();
@@ -149,6 +230,28 @@ void SectionView::ApplyTheme() {
     QColor border = ink;
     border.setAlpha(110);
     bands_[i]->setPen(QPen(border, 1));
+  }
+  for (std::size_t i = 0; i < lenses_.size(); ++i) {
+    const QColor color = LayerColor(bands_.size() + i, theme.IsDark());
+    lenses_[i]->setBrush(color);
+    lenses_[i]->setPen(QPen(ink, theme.Zoom(), Qt::DotLine));
+  }
+  for (std::size_t i = 0; i < curves_.size(); ++i)
+    curves_[i]->setPen(QPen(content_.curves[i].isDashed ? ink : CurveColor(i, theme.IsDark()), 1.5 * theme.Zoom(),
+                            content_.curves[i].isDashed ? Qt::DashLine : Qt::SolidLine));
+  const auto mark = [&](QCPGraph* graph, const QColor& color) {
+    if (graph) graph->setScatterStyle(QCPScatterStyle(QCPScatterStyle::ssDisc, color, color, 4 * theme.Zoom()));
+  };
+  mark(crossing_, theme.ErrorColor());
+  mark(thin_, theme.WarningColor());
+  for (QCPItemLine* screen : screens_) {
+    screen->setPen(QPen(ink, 4 * theme.Zoom(), Qt::SolidLine, Qt::FlatCap));
+    screen->setHead(QCPLineEnding::esBar);
+    screen->setTail(QCPLineEnding::esBar);
+  }
+  for (QCPItemText* name : screenNames_) {
+    name->setColor(ink);
+    name->setFont(QApplication::font());
   }
   if (ground_) ground_->setPen(QPen(ink, 2 * theme.Zoom()));
   if (pointer_) pointer_->setPen(QPen(theme.QuietColor(), 1, Qt::DashLine));
@@ -162,7 +265,8 @@ void SectionView::ApplyTheme() {
 void SectionView::Arrange() {
   const QFontMetrics metrics(QApplication::font());
   int widest = metrics.horizontalAdvance(tr("Ground"));
-  for (const BandPlottable* band : bands_) widest = std::max(widest, metrics.horizontalAdvance(band->name()));
+  for (int i = 0; i < chart_->plottableCount(); ++i)
+    widest = std::max(widest, metrics.horizontalAdvance(chart_->plottable(i)->name()));
   ArrangeLegend(*chart_, widest);
   const int distances = chart_->axisRect()->width() / (metrics.horizontalAdvance("000000") * 2);
   chart_->xAxis->ticker()->setTickCount(std::clamp(distances, 2, 9));
@@ -302,6 +406,8 @@ QString SectionView::TextAt(double distance, double height) const {
     if (height < band.top[*at] && height >= band.bottom[*at])
       text +=
           "   " + tr("%1 from %2 to %3").arg(ToQt(band.name), HeightText(band.top[*at]), HeightText(band.bottom[*at]));
+  for (const SectionProfile::Lens& lens : profile_.lenses)
+    if (height < lens.top[*at] && height >= lens.bottom[*at]) text += "   " + tr("in %1").arg(ToQt(lens.name));
   return text;
 }
 
@@ -311,6 +417,12 @@ QString SectionView::LayersAt(double distance) const {
   QString text = tr("ground %1").arg(HeightText(profile_.ground[*at]));
   for (const SectionProfile::Band& band : profile_.bands)
     text += "\n" + tr("%1 down to %2").arg(ToQt(band.name), HeightText(band.bottom[*at]));
+  for (const SectionProfile::Lens& lens : profile_.lenses)
+    if (!std::isnan(lens.top[*at]))
+      text +=
+          "\n" + tr("%1 from %2 to %3").arg(ToQt(lens.name), HeightText(lens.top[*at]), HeightText(lens.bottom[*at]));
+  for (const SectionProfile::Curve& curve : profile_.curves)
+    text += "\n" + tr("%1 %2").arg(ToQt(curve.name), HeightText(curve.heights[*at]));
   return text;
 }
 

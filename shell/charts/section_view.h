@@ -12,6 +12,8 @@
 
 class QComboBox;
 class QCPGraph;
+class QCPItemLine;
+class QCPItemText;
 class QCPItemStraightLine;
 class QCustomPlot;
 class QLabel;
@@ -58,6 +60,13 @@ class SectionView : public PlotFrame {
   struct Units;  ///< How the user sees lengths.
 
   void Build();
+  /// A line over the distance, in the user's units; gaps where there is no value.
+  QCPGraph* AddLine(const QString& name, const std::vector<double>& heights);
+  BandPlottable* AddBand(const std::string& name, const std::vector<double>& top, const std::vector<double>& bottom);
+  void AddMarks();
+  void AddScreens();
+  /// The profile as a table: distance, place, ground and the bottoms of all layers.
+  QString Values() const;
   void ApplyTheme();
   void Arrange();
   void FitHeights();
@@ -75,7 +84,11 @@ class SectionView : public PlotFrame {
   QLabel* message_;
   QComboBox* choice_;
   std::vector<BandPlottable*> bands_;
-  QCPGraph* ground_ = nullptr;
+  std::vector<BandPlottable*> lenses_;
+  std::vector<QCPGraph*> curves_;
+  std::vector<QCPItemLine*> screens_;
+  std::vector<QCPItemText*> screenNames_;
+  QCPGraph *ground_ = nullptr, *crossing_ = nullptr, *thin_ = nullptr;
   QCPItemStraightLine* pointer_ = nullptr;
 };
 

@@ -25,13 +25,14 @@ std::shared_ptr<const CTvn2DOrthoRotatedGridData> Row(std::vector<float> values,
 SectionContent Along(std::shared_ptr<const CTvn2DOrthoRotatedGridData> ground, std::vector<SectionSurface> surfaces) {
   SectionContent content;
   content.line = {{5, 5}, {ground->Geometry().nx * 10.0 - 5, 5}};
-  content.ground = std::move(ground);
+  content.ground = Level{std::move(ground)};
   content.surfaces = std::move(surfaces);
   return content;
 }
 
 TEST(SectionProfile, EachBandReachesFromTheNearestSurfaceAboveToItsBottom) {
-  const SectionContent content = Along(Row({10, 12, 11}), {{"Clay", Row({4, 15, kEmpty})}, {"Sand", Row({-5, 0, 3})}});
+  const SectionContent content =
+      Along(Row({10, 12, 11}), {{"Clay", {Row({4, 15, kEmpty})}}, {"Sand", {Row({-5, 0, 3})}}});
   const SectionProfile profile = ProfileOf(content, 10);
   ASSERT_EQ(profile.points.size(), 3U);
   EXPECT_THAT(profile.ground, ElementsAre(10, 12, 11));
@@ -45,12 +46,12 @@ TEST(SectionProfile, EachBandReachesFromTheNearestSurfaceAboveToItsBottom) {
 }
 
 TEST(SectionProfile, ElevationsOfAnyUnitAreComparedInMetres) {
-  const SectionProfile profile = ProfileOf(Along(Row({10, 10}), {{"Clay", Row({20, 20}, kFoot)}}), 100);
+  const SectionProfile profile = ProfileOf(Along(Row({10, 10}), {{"Clay", {Row({20, 20}, kFoot)}}}), 100);
   EXPECT_THAT(profile.bands[0].bottom, ElementsAre(DoubleNear(6.096, 1e-9), DoubleNear(6.096, 1e-9)));
 }
 
 TEST(SectionProfile, WithoutALineOrGroundThereIsNothing) {
-  SectionContent content = Along(Row({10, 12}), {{"Clay", Row({4, 5})}});
+  SectionContent content = Along(Row({10, 12}), {{"Clay", {Row({4, 5})}}});
   content.message = "Draw a section on the map.";
   EXPECT_EQ(Summary(content), "section of 10 m: ground, Clay");
   EXPECT_GT(StepFor(content), 0);

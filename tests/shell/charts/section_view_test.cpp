@@ -15,7 +15,7 @@ namespace {
 constexpr float kEmpty = -99;
 
 /// 100 cells of 50 m from west to east.
-std::shared_ptr<const CTvn2DOrthoRotatedGridData> Level(double value, int emptyFrom = 100) {
+std::shared_ptr<const CTvn2DOrthoRotatedGridData> Flat(double value, int emptyFrom = 100) {
   std::vector<float> values(100, static_cast<float>(value));
   for (std::size_t i = static_cast<std::size_t>(emptyFrom); i < values.size(); ++i) values[i] = kEmpty;
   auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
@@ -26,8 +26,8 @@ std::shared_ptr<const CTvn2DOrthoRotatedGridData> Level(double value, int emptyF
 SectionContent Ground() {
   SectionContent content;
   content.line = {{0, 25}, {4900, 25}};
-  content.ground = Level(40);
-  content.surfaces = {{"Clay", Level(30, 50)}, {"Sand", Level(10), 0x336699U}};
+  content.ground = Level{Flat(40)};
+  content.surfaces = {{"Clay", {Flat(30, 50)}}, {"Sand", {Flat(10)}, 0x336699U}};
   return content;
 }
 

@@ -1,0 +1,29 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Levels of the ground: where a layer ends, where a head stands. All that shows or writes levels asks these for
+// elevations.
+#pragma once
+
+#include <memory>
+#include <vector>
+
+#include "geometry/grid_section.h"
+#include "platform/key_number.h"
+
+namespace tervane {
+
+/// A level by a grid, in the unit that it tells (metres otherwise), or by one value in metres for all places.
+struct Level {
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid = nullptr;  ///< Null for one value.
+  KeyNumber<double> value = 0;
+  bool isAboveGround = false;  ///< Values are heights above ground, negative below it; else they are elevations.
+
+  bool operator==(const Level&) const = default;
+};
+
+/// Elevations in metres at the points of a line, where the ground has those; NaN where nothing is known.
+std::vector<double> ElevationsAlong(const Level& level, const std::vector<SectionPoint>& points,
+                                    const std::vector<double>& ground, GridSampling sampling = GridSampling::Bilinear);
+
+}  // namespace tervane
