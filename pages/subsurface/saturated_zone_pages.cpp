@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/subsurface/saturated_zone_pages.h"
 
+#include "pages/subsurface/ground_views.h"
 #include "subsurface/pages.h"
 #include "subsurface/saturated_zone.h"
 
@@ -9,15 +10,26 @@ namespace tervane {
 
 namespace {
 
-void DescribeSaturatedZone(PageForm& form, CSatZoneKvf& n) {
-  form.Check("Include subsurface drainage", n.Drainage).Revalidates();
-  form.Check("Include pumping wells", n.Wells).Revalidates();
-}
+class CSatZoneDlg : public PageOf<CSatZoneKvf> {
+ public:
+  CSatZoneDlg(CYbSEKvfBase& node, const PageContext& context) : PageOf(node, context), views_(*this, Node()) {}
+
+ protected:
+  void Describe(PageForm& form) override {
+    CSatZoneKvf& n = Node();
+    form.Check("Include subsurface drainage", n.Drainage).Revalidates();
+    form.Check("Include pumping wells", n.Wells).Revalidates();
+    views_.Describe(form);
+  }
+
+ private:
+  GroundViews views_;
+};
 
 }  // namespace
 
 std::span<const PageRow> SaturatedZonePages() {
-  static constexpr PageRow kRows[] = {DescribedBy<DescribeSaturatedZone>(kSaturatedZonePage)};
+  static constexpr PageRow kRows[] = {PageIs<CSatZoneDlg, CSatZoneKvf>(kSaturatedZonePage)};
   return kRows;
 }
 

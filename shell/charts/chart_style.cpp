@@ -95,7 +95,10 @@ void PutLegendAbove(QCustomPlot& chart) {
 
 void ArrangeLegend(QCustomPlot& chart, int widest) {
   const int columns = chart.width() / (std::max(widest, 1) + Theme::Get().Scaled(44));
+  if (chart.legend->wrap() == std::max(1, columns)) return;
   chart.legend->setWrap(std::max(1, columns));
+  // The names that are there already move, too.
+  chart.legend->setFillOrder(chart.legend->fillOrder(), true);
 }
 
 }  // namespace tervane
