@@ -26,6 +26,7 @@ void OfferImports(CommandOffers& offers) {
   OfferSeriesImport(offers, family);
   OfferGridImport(offers, family);
   OfferRiverImport(offers, family);
+  OfferWellImport(offers, family);
 }
 
 /// A file of commands is one row here, in the order of the help.

@@ -58,6 +58,7 @@ void OfferDataCommands(CommandOffers& offers);
 void OfferSeriesImport(CommandOffers& offers, const Command& family);
 void OfferGridImport(CommandOffers& offers, const Command& family);
 void OfferRiverImport(CommandOffers& offers, const Command& family);
+void OfferWellImport(CommandOffers& offers, const Command& family);
 void OfferExportCommand(CommandOffers& offers);
 void OfferCompletion(CommandOffers& offers);
 

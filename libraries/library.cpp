@@ -8,7 +8,9 @@
 
 #include <fmt/format.h>
 
+#include "core/file_name.h"
 #include "platform/file_cache.h"
+#include "platform/paths.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -34,13 +36,26 @@ void CheckRows(const LibraryKind& kind, const LibraryEntry& entry, std::size_t p
     findings.push_back({Severity::Error, line, place, row, std::move(text)});
   };
   for (const auto& [line, text] : entry.refused) findings.push_back({Severity::Error, line, place, {}, text});
-  if (entry.rows.empty()) add({}, fmt::format("it has no {}", kind.rowNames));
+  for (std::size_t i = 0; i < kind.fields.size(); ++i) {
+    const LibraryField& field = kind.fields[i];
+    const LibraryModel* model = ModelOf(field, entry.fields[i].text);
+    if (!field.models.empty() && entry.fields[i].numbers.empty())
+      add({}, fmt::format("{} is missing", field.key));
+    else if (model)
+      for (std::size_t parameter = 0; parameter < model->parameters.size(); ++parameter)
+        if (std::string fault = WhyWrong(model->parameters[parameter], entry.Number(i, parameter)); !fault.empty())
+          add({}, std::move(fault));
+  }
+  if (kind.HasRows() && !kind.HasRowSections() && entry.rows.empty())
+    add({}, fmt::format("it has no {}", kind.rowNames));
   for (std::size_t i = 0; i < entry.rows.size(); ++i) {
     const LibraryRow& row = entry.rows[i];
     for (std::size_t column = 0; column < kind.columns.size(); ++column)
       if (std::string fault = WhyWrong(kind.columns[column], row.values[column]); !fault.empty())
         add(i, std::move(fault));
-    if (i > 0 && row.values[0] < entry.rows[i - 1].values[0])
+    if (kind.whyWrongRow)
+      if (std::string fault = kind.whyWrongRow(entry, row); !fault.empty()) add(i, std::move(fault));
+    if (!kind.HasRowSections() && i > 0 && row.values[0] < entry.rows[i - 1].values[0])
       add(i, fmt::format("{} {} stands behind {}", kind.columns[0].head, ShortestNumber(row.values[0]),
                          ShortestNumber(entry.rows[i - 1].values[0])));
   }
@@ -51,7 +66,7 @@ void CheckRows(const LibraryKind& kind, const LibraryEntry& entry, std::size_t p
 bool LibraryRow::operator==(const LibraryRow& other) const {
   const auto isSame = [](double a, double b) { return a == b || (std::isnan(a) && std::isnan(b)); };
   return std::ranges::equal(values, other.values, isSame) && more == other.more && context == other.context &&
-         line == other.line;
+         line == other.line && file == other.file && item == other.item;
 }
 
 void LibraryEntry::DeleteRow(std::size_t row) {
@@ -64,7 +79,11 @@ void LibraryEntry::DeleteRow(std::size_t row) {
 LibraryEntry Library::NewEntry(std::string name) const {
   LibraryEntry entry;
   entry.fields.resize(kind->fields.size());
-  entry.fields.front() = {std::move(name), true, {}};
+  entry.fields.front().text = std::move(name);
+  entry.fields.front().isThere = true;
+  for (std::size_t i = 0; i < kind->fields.size(); ++i)
+    if (const LibraryField& field = kind->fields[i]; !field.models.empty())
+      ChooseModel(field.models.front(), entry.fields[i]);
   return entry;
 }
 
@@ -90,12 +109,18 @@ void Library::DeleteEntry(std::size_t entry) {
 std::string ReadLibrary(const std::string& path, Library& library) {
   FileContent content;
   if (const FileResult result = ReadWholeFile(path, content); !result.Ok()) return result.error;
-  return ParseLibrary(content, path, library);
+  std::string problem = ParseLibrary(content, path, library);
+  library.folder = FolderOf(path);
+  return problem;
 }
 
 FileResult WriteLibrary(const std::string& path, const Library& library) {
   std::string error;
-  const std::string text = LibraryFileText(library, error);
+  Library rebased = library;
+  const std::string folder(FolderOf(path));
+  for (LibraryEntry& entry : rebased.entries)
+    for (LibraryRow& row : entry.rows) row.file = FileName(row.file, library.folder).TextIn(folder);
+  const std::string text = LibraryFileText(rebased, error);
   if (!error.empty()) return {fmt::format("cannot write {}: {}; the file is unchanged", path, error), {}};
   return WriteFileAtomically(path, text);
 }
@@ -107,6 +132,19 @@ std::shared_ptr<const LibraryReading> ReadLibraryOnce(const LibraryKind& kind, c
     reading.problem = ReadLibrary(path, reading.library);
     return reading;
   });
+}
+
+const LibraryModel* ModelOf(const LibraryField& field, std::string_view name) {
+  const auto found = std::ranges::find(field.models, name, &LibraryModel::name);
+  return found == field.models.end() ? nullptr : &*found;
+}
+
+void ChooseModel(const LibraryModel& model, LibraryText& text) {
+  text.text = model.name;
+  text.isThere = true;
+  text.more.clear();
+  text.numbers.clear();
+  for (const LibraryColumn& parameter : model.parameters) text.numbers.emplace_back(parameter.initial);
 }
 
 std::string WhyWrong(const LibraryColumn& column, double value) {

@@ -6,6 +6,7 @@
 #pragma once
 
 #include <array>
+#include <limits>
 #include <memory>
 #include <optional>
 #include <string>
@@ -15,6 +16,7 @@
 #include "core/node.h"
 #include "libraries/library_kind.h"
 #include "platform/files.h"
+#include "platform/key_number.h"
 
 namespace tervane {
 
@@ -27,11 +29,14 @@ struct LibraryContext {
   bool operator==(const LibraryContext&) const = default;
 };
 
-/// A text of an entry; one that is not in the file is written when it is given.
+/// A text of an entry, or the name of a model with its parameters; one that is not in the file is written when it is
+/// given.
 struct LibraryText {
   std::string text;
   bool isThere = false;
   LibraryContext context = {};
+  std::vector<KeyNumber<double>> numbers = {};
+  std::string more = {};  ///< Values behind those that the kind knows: ", 1, 2".
 
   bool operator==(const LibraryText&) const = default;
 };
@@ -39,9 +44,11 @@ struct LibraryText {
 /// A row of numbers, as many as the kind has columns.
 struct LibraryRow {
   std::array<double, kMostLibraryColumns> values{};
-  std::string more = {};  ///< Values behind those that the kind knows: ", 1, 2".
+  std::string more = {};  ///< Values behind those that the kind knows: ", 1, 2"; of a section what is unknown in it.
   LibraryContext context = {};
-  int line = 0;  ///< Where it was read; 0 for a new one.
+  int line = 0;           ///< Where it was read; 0 for a new one.
+  std::string file = {};  ///< A data file, relative to the library's folder.
+  int item = 1;           ///< The item that is chosen in it.
 
   /// Missing numbers are equal.
   bool operator==(const LibraryRow& other) const;
@@ -64,6 +71,11 @@ struct LibraryEntry {
   int line = 0;  ///< Where it was read; 0 for a new one.
 
   const std::string& Name() const { return fields.front().text; }
+  /// A number of a field; missing where the field has none.
+  double Number(std::size_t field, std::size_t parameter = 0) const {
+    const auto& numbers = fields[field].numbers;
+    return parameter < numbers.size() ? double{numbers[parameter]} : std::numeric_limits<double>::quiet_NaN();
+  }
   /// Takes a row out; what stands in front of it and is no part of it stays.
   void DeleteRow(std::size_t row);
 
@@ -84,10 +96,13 @@ struct Library {
 
   const LibraryKind* kind;
   std::vector<LibraryEntry> entries;
-  std::string header;        ///< Comments in front of all.
-  std::string beforeTarget;  ///< Other targets.
-  std::string atEnd;         ///< Behind the last entry.
+  std::string header;         ///< Comments in front of all.
+  std::string beforeTarget;   ///< Other targets.
+  std::string beforeSection;  ///< Other parts of the target, where the entries stand in a section of it.
+  std::string behindSection;
+  std::string atEnd;  ///< Behind the last entry.
   std::string behindTarget;
+  std::string folder;  ///< Of the file that was read: names of data files are relative to it.
 
   /// An entry without rows.
   LibraryEntry NewEntry(std::string name) const;
@@ -119,6 +134,11 @@ struct LibraryReading {
 std::shared_ptr<const LibraryReading> ReadLibraryOnce(const LibraryKind& kind, const std::string& path);
 
 // ---- Checking
+
+/// The model of a field's numbers by its name; null for another name, and for a text.
+const LibraryModel* ModelOf(const LibraryField& field, std::string_view name);
+/// Takes another model, with the parameters that a new entry has of it.
+void ChooseModel(const LibraryModel& model, LibraryText& text);
 
 /// What is wrong with a number of a row: "LAI is 21, a number from 0 to 20 was expected". Empty when nothing is.
 std::string WhyWrong(const LibraryColumn& column, double value);

@@ -5,13 +5,14 @@
 #include <algorithm>
 
 #include "libraries/vegetations.h"
+#include "libraries/wells.h"
 #include "platform/text.h"
 
 namespace tervane {
 
 namespace {
 
-constexpr const LibraryKind* kKinds[] = {&kVegetationLibrary};
+constexpr const LibraryKind* kKinds[] = {&kVegetationLibrary, &kWellLibrary};
 
 }  // namespace
 

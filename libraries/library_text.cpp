@@ -4,6 +4,8 @@
 // Between the text of a library and its entries.
 #include <algorithm>
 #include <cmath>
+#include <limits>
+#include <span>
 
 #include <fmt/format.h>
 
@@ -16,6 +18,13 @@
 namespace tervane {
 
 namespace {
+
+/// Whether a name is a pattern with a number in the place of its %d.
+bool IsNumbered(std::string_view name, std::string_view pattern) {
+  const std::string_view prefix = pattern.substr(0, pattern.find("%d"));
+  return name.size() > prefix.size() && name.starts_with(prefix) &&
+         std::ranges::all_of(name.substr(prefix.size()), [](char c) { return c >= '0' && c <= '9'; });
+}
 
 class LibraryReader {
  public:
@@ -34,7 +43,7 @@ class LibraryReader {
       isFound = true;
       library_.beforeTarget = kept_.Take() + IndentedLines(kTop, kept_.CommentsUntil(static_cast<int>(target->line)));
       ReadTarget(*target);
-      library_.atEnd = kept_.Take();
+      (kind_.section.empty() ? library_.atEnd : library_.behindSection) += kept_.Take();
       // Behind the last of all nothing tells where a comment stands.
       if (!target->next) library_.atEnd += IndentedLines(kInTarget, kept_.CommentsUntil(KeptText::kEndOfFile));
     }
@@ -43,31 +52,53 @@ class LibraryReader {
   }
 
  private:
-  bool IsEntry(const KvfNode& node) const {
-    const std::string_view prefix = kind_.sectionPattern.substr(0, kind_.sectionPattern.find("%d"));
-    const std::string_view name = node.Name();
-    return !node.IsKeyword() && name.size() > prefix.size() && name.starts_with(prefix) &&
-           std::ranges::all_of(name.substr(prefix.size()), [](char c) { return c >= '0' && c <= '9'; });
-  }
+  bool IsEntry(const KvfNode& node) const { return !node.IsKeyword() && IsNumbered(node.Name(), kind_.sectionPattern); }
 
   void ReadTarget(const KvfSection& target) {
-    library_.entries.reserve(target.count);
+    if (kind_.section.empty()) return ReadEntries(target, kInTarget);
+    bool isFound = false;
     for (const KvfNode* node = target.firstChild; node; node = node->next) {
+      const KvfSection* section = AsSection(node);
+      if (isFound || !section || section->Name() != kind_.section) {
+        kept_.Keep(*node, kInTarget);
+        continue;
+      }
+      isFound = true;
+      kept_.KeepCommentsUntil(static_cast<int>(section->line), kInTarget);
+      library_.beforeSection = kept_.Take();
+      ReadEntries(*section, kInSection);
+      library_.atEnd = kept_.Take();
+    }
+    library_.behindSection = kept_.Take();
+  }
+
+  void ReadEntries(const KvfSection& parent, int level) {
+    level_ = level;
+    library_.entries.reserve(parent.count);
+    for (const KvfNode* node = parent.firstChild; node; node = node->next) {
       if (IsEntry(*node))
         ReadEntry(*AsSection(node));
-      else
-        kept_.Keep(*node, kInTarget);
+      else if (!IsCount(*node, kind_.countKey))
+        kept_.Keep(*node, level);
     }
+  }
+
+  static bool IsCount(const KvfNode& node, std::string_view key) {
+    return !key.empty() && node.IsKeyword() && node.Name() == key;
   }
 
   void ReadEntry(const KvfSection& section) {
     LibraryEntry& entry = library_.entries.emplace_back(library_.NewEntry({}));
-    entry.fields.front().isThere = false;
+    for (LibraryText& field : entry.fields) field = {};
     entry.line = static_cast<int>(section.line);
     TakeContext(section, entry.context);
     entry.rows.reserve(section.count);
-    for (const KvfNode* node = section.firstChild; node; node = node->next)
-      if (!node->IsKeyword() || !(ReadField(*node, entry) || ReadRow(*node, entry))) kept_.Keep(*node, kInSection);
+    for (const KvfNode* node = section.firstChild; node; node = node->next) {
+      const bool isTaken = node->IsKeyword()
+                               ? IsCount(*node, kind_.rowCountKey) || ReadField(*node, entry) || ReadRow(*node, entry)
+                               : ReadRowSection(*AsSection(node), entry);
+      if (!isTaken) kept_.Keep(*node, level_ + 1);
+    }
     entry.atEnd = kept_.Take();
   }
 
@@ -76,6 +107,7 @@ class LibraryReader {
     if (found == kind_.fields.end()) return false;
     LibraryText& field = entry.fields[static_cast<std::size_t>(found - kind_.fields.begin())];
     if (field.isThere) return Refuse(keyword, "it is there twice; the first is used");
+    if (!found->models.empty()) return ReadNumbers(keyword, *found, field);
     if (keyword.count != 1 || keyword.params[0].type != KvfType::String)
       return Refuse(keyword, "one text in quotes was expected");
     field.text = keyword.params[0].Text();
@@ -84,20 +116,81 @@ class LibraryReader {
     return true;
   }
 
+  static bool IsNumber(const KvfParam& param) {
+    return param.type == KvfType::Int || param.type == KvfType::Double || param.type == KvfType::Float;
+  }
+  /// Whether a keyword has a number for each column from that value on.
+  static bool HasNumbers(const KvfNode& keyword, std::uint32_t first, std::size_t count) {
+    return keyword.count >= first + count &&
+           std::all_of(keyword.params + first, keyword.params + first + count, IsNumber);
+  }
+  static std::string NumbersExpected(std::span<const LibraryColumn> columns) {
+    std::string heads;
+    for (const LibraryColumn& column : columns) heads += fmt::format("{}{}", heads.empty() ? "" : ", ", column.head);
+    return columns.size() == 1 ? fmt::format("a number was expected: {}", heads)
+                               : fmt::format("{} numbers were expected: {}", columns.size(), heads);
+  }
+
+  /// A model's name and its parameters, or numbers alone.
+  bool ReadNumbers(const KvfNode& keyword, const LibraryField& declared, LibraryText& field) {
+    const bool isNamed = !declared.models.front().name.empty();
+    const bool hasName = keyword.count > 0 && keyword.params[0].type == KvfType::String;
+    const LibraryModel* model = ModelOf(declared, isNamed && hasName ? keyword.params[0].Text() : std::string_view());
+    if (!model) {
+      std::string names;
+      for (const LibraryModel& known : declared.models)
+        names += fmt::format("{}\"{}\"", names.empty() ? "" : ", ", known.name);
+      return Refuse(keyword, fmt::format("a model and its parameters were expected; models are {}", names));
+    }
+    const std::uint32_t first = isNamed ? 1 : 0;
+    const std::size_t count = model->parameters.size();
+    if (!HasNumbers(keyword, first, count)) return Refuse(keyword, NumbersExpected(model->parameters));
+    field.text = model->name;
+    field.isThere = true;
+    for (std::size_t i = first; i < first + count; ++i) field.numbers.emplace_back(KvfNumber(keyword.params[i]));
+    for (std::size_t i = first + count; i < keyword.count; ++i) field.more += ", " + KvfValueText(keyword.params[i]);
+    TakeContext(keyword, field.context);
+    return true;
+  }
+
+  bool IsRowSection(const KvfSection& section) const {
+    return kind_.HasRowSections() && IsNumbered(section.Name(), kind_.rowKey);
+  }
+
+  bool ReadRowSection(const KvfSection& section, LibraryEntry& entry) {
+    if (!IsRowSection(section)) return false;
+    LibraryRow& row = entry.rows.emplace_back();
+    row.line = static_cast<int>(section.line);
+    row.values.fill(std::numeric_limits<double>::quiet_NaN());
+    TakeContext(section, row.context);
+    for (const KvfNode* node = section.firstChild; node; node = node->next)
+      if (!ReadPartOfRow(*node, row)) kept_.Keep(*node, level_ + 2);
+    kept_.KeepCommentsUntil(KeptText::LastLineOf(section) + 1, level_ + 2);
+    row.more = kept_.Take();
+    return true;
+  }
+
+  bool ReadPartOfRow(const KvfNode& node, LibraryRow& row) {
+    if (!node.IsKeyword()) return false;
+    if (!kind_.rowFile.key.empty() && node.Name() == kind_.rowFile.key) {
+      const bool isFile = node.count >= 1 && node.params[0].IsText();
+      if (!isFile || (node.count > 1 && node.params[1].type != KvfType::Int))
+        return Refuse(node, "a file and the number of an item were expected");
+      row.file = node.params[0].Text();
+      if (node.count > 1) row.item = node.params[1].asInt;
+      return true;
+    }
+    const auto column = std::ranges::find(kind_.columns, node.Name(), &LibraryColumn::key);
+    if (column == kind_.columns.end()) return false;
+    if (!HasNumbers(node, 0, 1)) return Refuse(node, "a number was expected");
+    row.values[static_cast<std::size_t>(column - kind_.columns.begin())] = KvfNumber(node.params[0]);
+    return true;
+  }
+
   bool ReadRow(const KvfNode& keyword, LibraryEntry& entry) {
     if (keyword.Name() != kind_.rowKey) return false;
     const std::size_t count = kind_.columns.size();
-    bool isRow = keyword.count >= count;
-    for (std::size_t i = 0; i < count && isRow; ++i) {
-      const KvfType type = keyword.params[i].type;
-      isRow = type == KvfType::Int || type == KvfType::Double || type == KvfType::Float;
-    }
-    if (!isRow) {
-      std::string heads;
-      for (const LibraryColumn& column : kind_.columns)
-        heads += fmt::format("{}{}", heads.empty() ? "" : ", ", column.head);
-      return Refuse(keyword, fmt::format("{} numbers were expected: {}", count, heads));
-    }
+    if (!HasNumbers(keyword, 0, count)) return Refuse(keyword, NumbersExpected(kind_.columns));
     LibraryRow& row = entry.rows.emplace_back();
     row.line = static_cast<int>(keyword.line);
     for (std::size_t i = 0; i < count; ++i) row.values[i] = KvfNumber(keyword.params[i]);
@@ -124,6 +217,7 @@ class LibraryReader {
   Library& library_;
   const LibraryKind& kind_;
   KeptText kept_{file_};
+  int level_ = kInTarget;  ///< Of the sections of entries.
 };
 
 // ---- Writing
@@ -147,21 +241,60 @@ void AppendLine(std::string& text, int level, const std::string& line, const Lib
   text += '\n';
 }
 
-void AppendEntry(std::string& text, const LibraryKind& kind, const LibraryEntry& entry, std::size_t number) {
-  const std::string_view prefix = kind.sectionPattern.substr(0, kind.sectionPattern.find("%d"));
-  AppendLine(text, kInTarget, fmt::format("section {}{} {{", prefix, number), entry.context);
+/// A section of that pattern and number.
+std::string SectionBegin(std::string_view pattern, std::size_t number) {
+  return fmt::format("section {}{} {{", pattern.substr(0, pattern.find("%d")), number);
+}
+
+std::string FieldValue(const LibraryField& declared, const LibraryText& field) {
+  const LibraryModel* model = ModelOf(declared, field.text);
+  if (!model) return KvfTextValue(field.text);
+  std::string value = model->name.empty() ? std::string() : KvfTextValue(field.text);
+  for (std::size_t i = 0; i < field.numbers.size(); ++i)
+    value += (value.empty() ? "" : ", ") + NumberValue(model->parameters[i], field.numbers[i]);
+  return value + field.more;
+}
+
+void AppendRowSection(std::string& text, const LibraryKind& kind, const LibraryRow& row, std::size_t number,
+                      int level) {
+  AppendLine(text, level, SectionBegin(kind.rowKey, number), row.context);
+  for (std::size_t i = 0; i < kind.columns.size(); ++i)
+    if (!std::isnan(row.values[i]))
+      text += IndentedLine(level + 1,
+                           fmt::format("{} = {}\n", kind.columns[i].key, NumberValue(kind.columns[i], row.values[i])));
+  if (!row.file.empty()) {
+    KvfParam file;
+    file.type = KvfType::Filename;
+    file.text = row.file.data();
+    file.length = static_cast<std::uint32_t>(row.file.size());
+    text += IndentedLine(level + 1, fmt::format("{} = {}, {}\n", kind.rowFile.key, KvfValueText(file), row.item));
+  }
+  text += row.more + IndentedLine(level, "}\n");
+}
+
+void AppendEntry(std::string& text, const LibraryKind& kind, const LibraryEntry& entry, std::size_t number, int level) {
+  AppendLine(text, level, SectionBegin(kind.sectionPattern, number), entry.context);
   for (std::size_t i = 0; i < kind.fields.size(); ++i) {
     const LibraryText& field = entry.fields[i];
     if (field.isThere || !field.text.empty())
-      AppendLine(text, kInSection, fmt::format("{} = {}", kind.fields[i].key, KvfTextValue(field.text)), field.context);
+      AppendLine(text, level + 1, fmt::format("{} = {}", kind.fields[i].key, FieldValue(kind.fields[i], field)),
+                 field.context);
   }
+  if (!kind.rowCountKey.empty())
+    text += IndentedLine(level + 1, fmt::format("{} = {}\n", kind.rowCountKey, entry.rows.size()));
+  std::size_t place = 0;
   for (const LibraryRow& row : entry.rows) {
+    ++place;
+    if (kind.HasRowSections()) {
+      AppendRowSection(text, kind, row, place, level + 1);
+      continue;
+    }
     std::string line = fmt::format("{} = ", kind.rowKey);
     for (std::size_t i = 0; i < kind.columns.size(); ++i)
       line += (i > 0 ? ", " : "") + NumberValue(kind.columns[i], row.values[i]);
-    AppendLine(text, kInSection, line + row.more, row.context);
+    AppendLine(text, level + 1, line + row.more, row.context);
   }
-  text += entry.atEnd + IndentedLine(kInTarget, "}\n");
+  text += entry.atEnd + IndentedLine(level, "}\n");
 }
 
 }  // namespace
@@ -180,9 +313,16 @@ std::string ParseLibrary(const FileContent& text, const std::string& path, Libra
 std::string LibraryFileText(const Library& library, std::string& error) {
   const LibraryKind& kind = *library.kind;
   std::string text = library.header + library.beforeTarget + fmt::format("target {} {{\n", kind.target);
+  const int level = kind.section.empty() ? kInTarget : kInSection;
+  if (!kind.section.empty())
+    text += library.beforeSection + IndentedLine(kInTarget, fmt::format("section {} {{\n", kind.section));
+  if (!kind.countKey.empty())
+    text += IndentedLine(level, fmt::format("{} = {}\n", kind.countKey, library.entries.size()));
   std::size_t number = 0;
-  for (const LibraryEntry& entry : library.entries) AppendEntry(text, kind, entry, ++number);
-  text += library.atEnd + "}\n" + library.behindTarget;
+  for (const LibraryEntry& entry : library.entries) AppendEntry(text, kind, entry, ++number, level);
+  text += library.atEnd;
+  if (!kind.section.empty()) text += IndentedLine(kInTarget, "}\n") + library.behindSection;
+  text += "}\n" + library.behindTarget;
   // What a later reading would refuse must not take the place of a good file.
   KvfFile read;
   error.clear();

@@ -3,10 +3,14 @@
 #include "pages/library_editor.h"
 
 #include <algorithm>
+#include <cmath>
 
 #include <fmt/format.h>
 
+#include "data/csv_reader.h"
 #include "forms/table_of.h"
+#include "pages/library_views.h"
+#include "platform/paths.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -106,7 +110,11 @@ class LibraryEditor::Page : public CYbSEDlgBase {
     const LibraryKind& kind = editor_.Kind();
     const Condition hasEntry =
         Sentence(fmt::format("the library has a {}", kind.entryName), [this] { return Entry() != nullptr; });
-    for (std::size_t i = 0; i < kind.fields.size(); ++i)
+    for (std::size_t i = 0; i < kind.fields.size(); ++i) {
+      if (!kind.fields[i].models.empty()) {
+        DescribeNumbers(form, i, hasEntry);
+        continue;
+      }
       form.Text(
               std::string(kind.fields[i].label),
               [this, i] { return Entry() ? Entry()->fields[i].text : std::string(); },
@@ -115,6 +123,70 @@ class LibraryEditor::Page : public CYbSEDlgBase {
               })
           .ToolTip(std::string(kind.fields[i].toolTip))
           .EnabledWhen(hasEntry);
+    }
+    if (kind.HasRows()) DescribeRows(form, hasEntry);
+    const LibraryView* view = ViewOf(kind);
+    if (view && view->describe) view->describe(form, *this);
+    if (view && view->map)
+      form.Map([this, view] { return view->map(editor_.Content(), editor_.Current()); }).ShownWhen(hasEntry);
+    form.Chart([this, view] {
+      SeriesContent none;
+      none.message = fmt::format("The library has no {}.", editor_.Kind().entryNames);
+      if (!Entry()) return none;
+      return view && view->chart ? view->chart(editor_.Content(), *Entry()) : ChartOf(editor_.Kind(), *Entry());
+    });
+  }
+
+ private:
+  /// The numbers of a field: its model, where there are several, and the parameters of each.
+  void DescribeNumbers(PageForm& form, std::size_t field, const Condition& hasEntry) {
+    const LibraryField& declared = editor_.Kind().fields[field];
+    const bool isNamed = !declared.models.front().name.empty();
+    if (isNamed) {
+      std::vector<std::string> names;
+      for (const LibraryModel& model : declared.models) names.emplace_back(model.name);
+      form.Choice(
+              std::string(declared.label),
+              [this, field, &declared] {
+                const LibraryModel* model = Entry() ? ModelOf(declared, Entry()->fields[field].text) : nullptr;
+                return model ? static_cast<int>(model - declared.models.data()) : -1;
+              },
+              [this, field, &declared](int choice) {
+                if (Entry() && choice >= 0 && choice < static_cast<int>(declared.models.size()))
+                  ChooseModel(declared.models[static_cast<std::size_t>(choice)], Entry()->fields[field]);
+              },
+              std::move(names))
+          .ToolTip(std::string(declared.toolTip))
+          .EnabledWhen(hasEntry);
+    }
+    for (const LibraryModel& model : declared.models)
+      for (std::size_t i = 0; i < model.parameters.size(); ++i) {
+        const LibraryColumn& parameter = model.parameters[i];
+        Control& number =
+            form.Bare(ControlKind::Number, isNamed ? fmt::format("{}:", parameter.head) : std::string(declared.label));
+        number.Unit(std::string(parameter.unit)).ToolTip(std::string(parameter.toolTip)).EnabledWhen(hasEntry);
+        number.text = [this, field, i] {
+          const double value = Entry() ? Entry()->Number(field, i) : std::nan("");
+          return std::isnan(value) ? std::string() : ShortestNumber(value);
+        };
+        number.enter = [this, field, i, &model, &parameter](const std::string& typed) -> std::string {
+          const auto value = ParseCsvNumber(typed, true);
+          if (!value) return "a number was expected";
+          std::string wrong = WhyWrong(parameter, *value);
+          if (!wrong.empty() || !Entry()) return wrong;
+          LibraryText& text = Entry()->fields[field];
+          if (text.numbers.size() != model.parameters.size()) ChooseModel(model, text);
+          text.numbers[i] = *value;
+          return {};
+        };
+        if (isNamed)
+          number.ShownWhen(fmt::format("the model is {}", model.name),
+                           [this, field, &model] { return Entry() && Entry()->fields[field].text == model.name; });
+      }
+  }
+
+  void DescribeRows(PageForm& form, const Condition& hasEntry) {
+    const LibraryKind& kind = editor_.Kind();
     auto table = std::make_shared<TableOf<LibraryRow>>(std::make_shared<Rows>(editor_));
     table->ItemName(Capital(kind.rowName), Capital(kind.rowNames));
     table->KeepOrder();
@@ -132,16 +204,21 @@ class LibraryEditor::Page : public CYbSEDlgBase {
           .ToolTip(std::string(column.toolTip))
           .Width(85);
     }
+    if (!kind.rowFile.key.empty()) {
+      table
+          ->Value(
+              std::string(kind.rowFile.label),
+              [this](const LibraryRow& row) { return FileName(row.file, editor_.Content().folder); },
+              [this](LibraryRow& row, const FileName& file) {
+                row.file = file.IsEmpty() ? std::string() : StoredPath(file.Absolute(), editor_.Content().folder);
+              })
+          .ToolTip(std::string(kind.rowFile.toolTip))
+          .Width(220);
+      table->Value("Item", &LibraryRow::item).Width(60);
+    }
     form.Table(table).EnabledWhen(hasEntry);
-    form.Chart([this] {
-      if (Entry()) return ChartOf(editor_.Kind(), *Entry());
-      SeriesContent none;
-      none.message = fmt::format("The library has no {}.", editor_.Kind().entryNames);
-      return none;
-    });
   }
 
- private:
   LibraryEntry* Entry() const {
     auto& entries = editor_.library_.entries;
     return editor_.current_ < entries.size() ? &entries[editor_.current_] : nullptr;

@@ -4,6 +4,7 @@
 
 #include "simspec/basic_parameters.h"
 #include "simspec/conditions.h"
+#include "spatial/domain.h"
 #include "subsurface/drainage.h"
 #include "subsurface/geology.h"
 #include "subsurface/pages.h"
@@ -46,6 +47,30 @@ CSatZoneKvf::CSatZoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Saturated Zone", 
   NewImportantChild<CDrainageMFSZKvf>(kModflowDrains);
   NewImportantChild<CSZWellKvf>(kWells, Wells);
   NewChild<CData2DKvf>(kAirFlowHead, AirFlowModelled() && Is(TypeAmbientWaterHeadInput, kHydrostatic));
+}
+
+bool CSatZoneKvf::AddWellOverlaySection(KvfFile* file, std::string& error) const {
+  error.clear();
+  if (!Wells) return true;
+  const auto* domain = Important(kDomain);
+  const auto* wells = Important(kWells);
+  const Envelope area = domain ? domain->GetEnvelope() : Envelope();
+  kvfAddSection(file, "Wells");
+  kvfPutParam(file, "DisplayName", "Wells");
+  kvfPutParam(file, "MinX", area.xMin);
+  kvfPutParam(file, "MaxX", area.xMax);
+  kvfPutParam(file, "MinY", area.yMin);
+  kvfPutParam(file, "MaxY", area.yMax);
+  if (!wells || wells->Filename.IsEmpty()) {
+    error = "Missing data for saturated zone. Well file is not specified";
+  } else {
+    kvfPutParamFilename(file, "WellFileName", wells->Filename.Absolute());
+    kvfPutParam(file, "LabelVisible", 1);
+    kvfPutParam(file, "FilterStartAngle", 0);
+    kvfPutParam(file, "FilterStopAngle", 360);
+  }
+  kvfEndSection(file);
+  return error.empty();
 }
 
 const std::string& CSatZoneKvf::GetTitle() const {

@@ -34,6 +34,9 @@ class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution {
 
   /// With a Modflow engine the zone is called another name.
   const std::string& GetTitle() const override;
+  /// Adds a section that tells a viewer of scenes of the wells, where they are included. False, with the reason in
+  /// `error`, when their file is not named; the section is complete as far as it goes.
+  bool AddWellOverlaySection(KvfFile* file, std::string& error) const;
   const int& TypeOfGeoParaDistribution() const override { return ParameterDistribution; }
 
  protected:

@@ -11,9 +11,12 @@
 
 #include "pages/parts/domain_map.h"
 #include "pages/parts/plot_content.h"
+#include "pages/parts/well_map.h"
+#include "spatial/domain.h"
 #include "subsurface/geology.h"
 #include "subsurface/ground_layers.h"
 #include "subsurface/saturated_zone.h"
+#include "subsurface/wells.h"
 
 namespace tervane {
 
@@ -209,6 +212,7 @@ MapContent GroundViews::Map() {
   }
   section_.PutOn(map);
   question_.PutOn(map);
+  if (!map.IsEmpty()) AddWells(map, Wells());
   if (place_ && !map.IsEmpty()) map.points.push_back({.points = {*place_}});
   return map;
 }
@@ -268,6 +272,13 @@ MapContent GroundViews::ThicknessMap(std::size_t layer) {
 
 // ---- The section
 
+std::vector<CTvnWellData> GroundViews::Wells() const {
+  const auto* wells = zone_.Important(kWells);
+  CTvnWellDataList list;
+  if (zone_.Wells && wells && !wells->Filename.IsEmpty()) list.LoadWellDataFile(wells->Filename.Absolute());
+  return list.Wells();
+}
+
 SectionContent GroundViews::Section() {
   SectionContent section;
   std::string problem;
@@ -292,6 +303,10 @@ SectionContent GroundViews::Section() {
       if (isNew) section.curves.push_back({fmt::format("Initial head in {}", layer.name), *head});
     }
   }
+  for (const CTvnWellData& well : Wells())
+    for (const CTvnWellFilter& filter : well.filters)
+      section.screens.push_back({well.name, well.place, filter.top, filter.bottom});
+  if (const auto* domain = zone_.Important(kDomain)) section.screenReach = domain->GetModelGeometry().cellSize;
   section.minimumThickness = static_cast<double>(zone_.MimimumLayerThickness);
   if (section.IsEmpty() && section.awaited.empty() && section.message.empty())
     section.message = problem.empty() ? "The ground or the levels of the layers are not known." : problem;

@@ -12,6 +12,7 @@
 #include "forms/map_question.h"
 #include "forms/page.h"
 #include "forms/table_of.h"
+#include "libraries/wells.h"
 #include "pages/parts/section_tool.h"
 #include "spatial/data2d.h"
 
@@ -47,6 +48,8 @@ class GroundViews {
   MapContent Map();
   MapContent ThicknessMap(std::size_t layer);
   SectionContent Section();
+  /// The wells of the setup, where they take part.
+  std::vector<CTvnWellData> Wells() const;
   void Probe(MapPoint place);
 
   CYbSEDlgBase& page_;

@@ -2,8 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/subsurface/well_pages.h"
 
+#include <fmt/format.h>
+
+#include "libraries/wells.h"
 #include "pages/parts/domain_map.h"
 #include "pages/parts/file_controls.h"
+#include "pages/parts/well_map.h"
 #include "platform/files.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/conditions.h"
@@ -17,6 +21,18 @@ namespace {
 
 constexpr const char* kFilter = "Well parameter file (*.WEL)|*.WEL||";
 constexpr int kFollowedByTree = kDataChanged | kTreeRebuilt;
+
+/// What is wrong with the wells of a file; empty where nothing is, and without a file.
+std::string WellFaults(const FileName& file) {
+  if (file.IsEmpty()) return {};
+  const auto reading = ReadLibraryOnce(kWellLibrary, file.Absolute());
+  if (!reading->problem.empty()) return reading->problem;
+  const std::vector<LibraryFinding> findings = FindingsOf(reading->library);
+  if (findings.empty()) return {};
+  std::string text = FindingText(file.Text(), reading->library, findings.front());
+  if (findings.size() > 1) text += fmt::format(" ({} more)", findings.size() - 1);
+  return text;
+}
 
 class CSZWellDlg : public PageOf<CSZWellKvf> {
  public:
@@ -33,10 +49,13 @@ class CSZWellDlg : public PageOf<CSZWellKvf> {
           .Of(*zone, "FractureWells")
           .ShownWhen(WithEngine({kEngineModflowSurfact}))
           .EnabledWhen(On(zone->Wells));
+    form.Notice([&n] { return WellFaults(n.Filename); });
     form.Check("Show well location map", n.IncludeMap);
     Control& map = form.Map([&n] {
       MapContent content = DomainMap(n);
       for (GridLayer& grid : content.grids) grid.withLegend = false;
+      CTvnWellDataList wells;
+      if (!n.Filename.IsEmpty() && wells.LoadWellDataFile(n.Filename.Absolute())) AddWells(content, wells.Wells());
       return content;
     });
     map.label = n.GetTitle();

@@ -4,8 +4,10 @@
 
 #include <gmock/gmock.h>
 
+#include "core/kvf.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
+#include "subsurface/wells.h"
 #include "tests/simspec/test_setup.h"
 
 namespace tervane {
@@ -32,6 +34,30 @@ TEST(SaturatedZone, TakesPartByTheComponentsOfTheEngine) {
     modflow.Subsurface = c.subsurface;
     EXPECT_EQ(zone.IsDlgUsedInSetup() != 0, c.takesPart) << c.engine << c.isOn << c.method;
   }
+}
+
+TEST(SaturatedZone, TellsAViewerOfScenesOfItsWells) {
+  const auto told = [](CSatZoneKvf& zone, bool isDone) {
+    KvfFile* file = kvfCreate();
+    kvfAddTarget(file, "Scene");
+    std::string error, text, problem;
+    EXPECT_EQ(zone.AddWellOverlaySection(file, error), isDone);
+    EXPECT_EQ(error, isDone ? "" : "Missing data for saturated zone. Well file is not specified");
+    kvfEndSection(file);
+    EXPECT_TRUE(WriteKvfText(*file, text, problem)) << problem;
+    kvfClose(&file);
+    return text;
+  };
+  test::TestSetup setup;
+  auto& zone = setup.At<CSatZoneKvf>("SaturatedZone");
+  EXPECT_EQ(told(zone, true), "target Scene {\n}\n");
+  zone.Wells = 1;
+  EXPECT_NE(told(zone, false).find("section Wells {"), std::string::npos);
+  setup.At<CSZWellKvf>("SaturatedZone/Well").Filename = FileName("a.WEL", "/setups");
+  const std::string text = told(zone, true);
+  EXPECT_NE(text.find("WellFileName = file \"/setups/a.WEL\"\n    LabelVisible = 1\n    FilterStartAngle = 0"),
+            std::string::npos)
+      << text;
 }
 
 }  // namespace
