@@ -72,6 +72,9 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
     for (const Finding& remark : row.remarks)
       fmt::print(out, "{}: {}: {}{}\n", NameOf(remark.severity), OneLine(row.file.path), OneLine(remark.text),
                  remark.detail.empty() ? "" : fmt::format(" ({})", OneLine(remark.detail)));
+  for (const CoverageCheckResult& check : board.checks)
+    for (const Finding& finding : check.findings)
+      fmt::print(out, "{}: {}: {}\n", NameOf(finding.severity), OneLine(check.check.path), OneLine(finding.text));
   for (const ForcingTotals& totals : board.forcings) {
     fmt::print(out, "\n{}: {}; in brackets shares of domain and time\n", totals.forcing.path, totals.Heading());
     Rows table{{"station"}};
@@ -163,7 +166,10 @@ std::string JsonTotals(const ForcingTotals& totals, const std::vector<TotalsPeri
 }
 
 void WriteJson(const CoverageBoard& board, std::ostream& out) {
-  std::vector<std::string> files, forcings;
+  std::vector<std::string> files, forcings, checks;
+  for (const CoverageCheckResult& check : board.checks)
+    for (const Finding& finding : check.findings)
+      checks.push_back(JsonObject({{"path", JsonQuoted(check.check.path)}, {"text", JsonQuoted(finding.text)}}));
   for (const CoverageRow& row : board.rows) files.push_back(JsonRow(row));
   for (const ForcingTotals& totals : board.forcings) forcings.push_back(JsonTotals(totals, board.periods));
   fmt::print(out, "{}\n",
@@ -171,7 +177,8 @@ void WriteJson(const CoverageBoard& board, std::ostream& out) {
                          {"domainCells", board.domain ? std::to_string(board.domainCells) : ""},
                          {"domainProblem", Optional(board.domainProblem)},
                          {"files", JsonArray(files)},
-                         {"forcings", JsonArray(forcings)}}));
+                         {"forcings", JsonArray(forcings)},
+                         {"checks", JsonArray(checks)}}));
 }
 
 }  // namespace
@@ -185,6 +192,7 @@ int CoverageCommand(const std::string& file, bool json, Streams streams) {
   const auto isNote = [](const Finding& remark) { return remark.severity == Severity::Note; };
   const bool isCovered =
       board.domain && board.request.simulation &&
+      std::ranges::all_of(board.checks, [](const auto& check) { return check.findings.empty(); }) &&
       std::ranges::all_of(board.rows, [](const CoverageRow& row) { return row.state <= CoverageState::Note; }) &&
       std::ranges::all_of(board.forcings, [&](const ForcingTotals& totals) {
         return std::ranges::all_of(totals.remarks, isNote) &&

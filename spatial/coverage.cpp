@@ -117,6 +117,17 @@ class CoverageBuilder {
       board_.forcings.back().forcing = forcing;
       ++done;
     }
+    for (const CoverageCheck& check : board_.request.checks) {
+      LeaveIfCancelled();
+      const CoverageCheckResult* same = nullptr;
+      if (IsOfSameSetting())
+        for (const CoverageCheckResult& each : previous_->checks)
+          if (each.check == check) same = &each;
+      if (same)
+        board_.checks.push_back(*same);
+      else if (board_.domain)
+        board_.checks.push_back({check, FindingsInCells(check.check, *board_.domain, progress_.Part(done / parts, 1))});
+    }
     LeaveIfCancelled();
     progress_.Report(1);
     return std::move(board_);

@@ -14,6 +14,7 @@
 #include "core/node.h"
 #include "geometry/grid.h"
 #include "platform/progress.h"
+#include "spatial/cell_checks.h"
 #include "spatial/data_use.h"
 #include "spatial/domain_cells.h"
 #include "spatial/series_totals.h"
@@ -44,11 +45,21 @@ struct CoverageForcing {
   bool operator==(const CoverageForcing&) const = default;
 };
 
+/// What a node wants held against each other in the cells of the domain.
+struct CoverageCheck {
+  std::string path;
+  std::uint64_t serial = 0;
+  CellCheck check;
+
+  bool operator==(const CoverageCheck&) const = default;
+};
+
 struct CoverageRequest {
   std::optional<TimeSpan> simulation;  ///< Nothing while its dates are none.
   DomainSource domain;
   std::vector<CoverageFile> files;
   std::vector<CoverageForcing> forcings;
+  std::vector<CoverageCheck> checks;
 
   bool operator==(const CoverageRequest&) const = default;
 };
@@ -118,6 +129,12 @@ struct TotalsPeriod {
   TimeSpan span;
 };
 
+/// What such a check found.
+struct CoverageCheckResult {
+  CoverageCheck check;
+  std::vector<Finding> findings;
+};
+
 struct CoverageBoard {
   CoverageRequest request;
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> domain;
@@ -126,6 +143,7 @@ struct CoverageBoard {
   std::vector<CoverageRow> rows;
   std::vector<TotalsPeriod> periods;
   std::vector<ForcingTotals> forcings;
+  std::vector<CoverageCheckResult> checks;
 };
 
 /// Computes the board; what `previous` answers to the same question is taken from it. An error is "cancelled" alone.

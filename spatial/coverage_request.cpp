@@ -64,6 +64,9 @@ void AddRequestsBelow(const CYbSEKvfBase& node, WalkedNode& place, CoverageReque
     if (const auto* driver = dynamic_cast<const ForcingNode*>(child))
       for (Forcing& forcing : driver->CurrentForcings())
         request.forcings.push_back({childPlace.Path(), child->Serial(), std::move(forcing)});
+    if (const auto* checker = dynamic_cast<const CellChecker*>(child))
+      for (CellCheck& check : checker->CurrentChecks())
+        request.checks.push_back({childPlace.Path(), child->Serial(), std::move(check)});
     AddRequestsBelow(*child, childPlace, request);
   }
 }

@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "spatial/cell_checks.h"
 #include "spatial/data2d.h"
 
 namespace tervane {
@@ -28,5 +29,8 @@ std::vector<GroundBody> GeologicalLayersOf(const CSatZoneKvf& zone);
 std::vector<GroundBody> GeologicalLensesOf(const CSatZoneKvf& zone);
 /// Those that are computed; none where they are uniform.
 std::vector<GroundBody> ComputationalLayersOf(const CSatZoneKvf& zone);
+
+/// What is to be held against each other in the cells of the domain.
+std::vector<CellCheck> GroundChecksOf(const CSatZoneKvf& zone);
 
 }  // namespace tervane

@@ -7,6 +7,7 @@
 #include "spatial/domain.h"
 #include "subsurface/drainage.h"
 #include "subsurface/geology.h"
+#include "subsurface/ground_layers.h"
 #include "subsurface/pages.h"
 #include "subsurface/wells.h"
 
@@ -72,6 +73,8 @@ bool CSatZoneKvf::AddWellOverlaySection(KvfFile* file, std::string& error) const
   kvfEndSection(file);
   return error.empty();
 }
+
+std::vector<CellCheck> CSatZoneKvf::CurrentChecks() const { return GroundChecksOf(*this); }
 
 const std::string& CSatZoneKvf::GetTitle() const {
   static const std::string withModflow = "Subsurface";

@@ -4,12 +4,13 @@
 // The aquifer: how its geology is told and what it is divided into for the computation.
 #pragma once
 
+#include "spatial/cell_checks.h"
 #include "spatial/geo_data.h"
 
 namespace tervane {
 
 /// Flags are 0 or 1.
-class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution {
+class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution, public CellChecker {
  public:
   explicit CSatZoneKvf(CYbSEKvfBase* parent);
 
@@ -32,6 +33,8 @@ class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution {
   int Threshold = 0;
   int MassTransferToImmobileWater = 0;
 
+  /// That levels lie in order, heads and screens in the ground, and that codes have a unit.
+  std::vector<CellCheck> CurrentChecks() const override;
   /// With a Modflow engine the zone is called another name.
   const std::string& GetTitle() const override;
   /// Adds a section that tells a viewer of scenes of the wells, where they are included. False, with the reason in

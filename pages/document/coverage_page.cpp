@@ -197,6 +197,13 @@ std::string CCoverageDlg::RemarksText() const {
   return text.empty() ? "no data file is in use" : text;
 }
 
+std::string CCoverageDlg::ChecksText() const {
+  std::string text;
+  for (const CoverageCheckResult& check : board_ ? board_->checks : std::vector<CoverageCheckResult>())
+    for (const Finding& finding : check.findings) text += fmt::format("{}{}", text.empty() ? "" : "\n", finding.text);
+  return text;
+}
+
 MapContent CCoverageDlg::Map() {
   const auto computation = Node().Board();
   MapContent map;
@@ -287,6 +294,7 @@ void CCoverageDlg::Describe(PageForm& form) {
   files->OnChoose([this](int row) { ShowFile(row); });
   form.Table(files);
   form.Shown("Remarks:", [this] { return RemarksText(); });
+  form.Notice([this] { return ChecksText(); });
 
   totalsTable_ = std::make_shared<TableOf<CoverageTotalsRow>>(totals_);
   totalsTable_->ItemName("Total");

@@ -54,6 +54,7 @@ class CCoverageDlg : public PageOf<CCoverageKvf> {
   std::string SimulationText() const;
   std::string DomainText() const;
   std::string RemarksText() const;
+  std::string ChecksText() const;
   MapContent Map();
   SeriesContent Chart();
 
