@@ -79,4 +79,19 @@ CDrainageMFSZKvf::CDrainageMFSZKvf(CYbSEKvfBase* parent) : CYbSEKvfListBase("Dra
   TakesPartWhen(!OwnEngine() && DrainageIncluded());
 }
 
+void CDrainageMFSZKvf::SetItemCount(int count, int level) {
+  CYbSEKvfListBase::SetItemCount(count, level);
+  LetLastAnswer();
+}
+
+void CDrainageMFSZKvf::DeleteItem(int number, int level) {
+  CYbSEKvfListBase::DeleteItem(number, level);
+  LetLastAnswer();
+}
+
+void CDrainageMFSZKvf::LetLastAnswer() {
+  const CDrainageMFSZItemKvf* last = GetItem(GetItemCount());
+  if (last && GetRoot()) GetRoot()->RegisterImportantNode(last->Child<CTimeseriesConstKvf>(), kDrainTimeConstant.text);
+}
+
 }  // namespace tervane

@@ -42,8 +42,15 @@ class CDrainageMFSZKvf : public CYbSEKvfListBase<CDrainageMFSZItemKvf> {
  public:
   explicit CDrainageMFSZKvf(CYbSEKvfBase* parent);
 
+  void SetItemCount(int count, int level) override;
+  void DeleteItem(int number, int level) override;
+
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("NumberOfLayers", *this); }
+
+ private:
+  /// The last drain that is left answers in the place of one that went.
+  void LetLastAnswer();
 };
 inline constexpr ImportantName<CDrainageMFSZKvf> kModflowDrains{"DRAINAGE_MODFLOW"};
 

@@ -69,6 +69,9 @@ TEST(Drainage, ModflowDrainsAreANamedList) {
   EXPECT_EQ(setup.WrittenKeys("SaturatedZone/Drainage_Modflow"), "YbSEKvfListItemCount=3 NumberOfLayers=3");
   EXPECT_EQ(setup.Written("SaturatedZone/Drainage_Modflow/Drainage_Modflow_2/Level:FixedValue"), "5f");
   EXPECT_EQ(setup.Root().Important(kDrainTimeConstant)->GetParent(), drains.GetItem(3));
+  drains.DeleteItem(3, 1);
+  ASSERT_NE(setup.Root().Important(kDrainTimeConstant), nullptr);
+  EXPECT_EQ(setup.Root().Important(kDrainTimeConstant)->GetParent(), drains.GetItem(2));
 }
 
 }  // namespace
