@@ -29,8 +29,8 @@ constexpr LibraryColumn kDepth[] = {{"Depth", "m", "From the ground to the botto
 constexpr LibraryModel kXAlone[] = {{"", kX}}, kYAlone[] = {{"", kY}}, kLevelAlone[] = {{"", kLevel}},
                        kDepthAlone[] = {{"", kDepth}};
 
-enum Field { kWellName, kXField, kYField, kLevelField, kDepthField, kWellField };
-constexpr LibraryField kFields[] = {
+enum WellFieldNumber { kWellName, kXField, kYField, kLevelField, kDepthField, kWellField };
+constexpr LibraryField kWellFields[] = {
     {"Name", "Name:", "The name by which others know the well"},
     {"X", "X:", "", kXAlone},
     {"Y", "Y:", "", kYAlone},
@@ -39,8 +39,8 @@ constexpr LibraryField kFields[] = {
     {"Field", "Well field:", "The well field that the well belongs to"},
 };
 
-enum Column { kFilterTop, kFilterBottom };
-constexpr LibraryColumn kColumns[] = {
+enum FilterColumn { kFilterTop, kFilterBottom };
+constexpr LibraryColumn kFilterColumns[] = {
     {"Top", "m", "Elevation of the upper end of the filter", false, -kFar, kFar, 0, "Top"},
     {"Bottom", "m", "Elevation of the lower end of the filter", false, -kFar, kFar, 0, "Bottom"},
 };
@@ -67,9 +67,9 @@ constexpr LibraryKind kWellLibrary{
     .filter = "Well parameter file (*.WEL)|*.WEL||",
     .target = "WEL_CFG",
     .sectionPattern = "Well_%d",
-    .fields = kFields,
+    .fields = kWellFields,
     .rowKey = "Filter_%d",
-    .columns = kColumns,
+    .columns = kFilterColumns,
     .section = "WELLDATA",
     .countKey = "NoWells",
     .rowCountKey = "NoFilters",

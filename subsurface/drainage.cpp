@@ -12,28 +12,28 @@ namespace tervane {
 
 namespace {
 
-constexpr KeyChoice kDrainageOptions[] = {
+constexpr KeyChoice kSubsurfaceDrainageOptions[] = {
     {CDrainageSZKvf::kNoDrainage, "No drainage", false},
     {CDrainageSZKvf::kDownhill, "Drainage routed downhill based on adjacent drain levels"},
     {CDrainageSZKvf::kByCodes, "Drainage routing based on grid codes"},
     {CDrainageSZKvf::kDistributed, "Distributed drainage options"},
     {CDrainageSZKvf::kRemoved, "Drainage not routed, but removed from model"}};
 
-const Data2DKind kLevel{.className = "CDrainageLevelSZKvf",
-                        .section = "Level",
-                        .title = "Level",
-                        .itemType = quantity::kElevation,
-                        .relativeToGround = Data2DKind::RelativeToGround::Off};
-const Data2DKind kTimeConstant{.className = "CDrainageTimeConstantSZKvf",
-                               .section = "TimeConstant",
-                               .title = "Time Constant",
-                               .itemType = quantity::kLeakageCoefficient};
-const Data2DKind kCodes{
+const Data2DKind kDrainLevelKind{.className = "CDrainageLevelSZKvf",
+                                 .section = "Level",
+                                 .title = "Level",
+                                 .itemType = quantity::kElevation,
+                                 .relativeToGround = Data2DKind::RelativeToGround::Off};
+const Data2DKind kTimeConstantKind{.className = "CDrainageTimeConstantSZKvf",
+                                   .section = "TimeConstant",
+                                   .title = "Time Constant",
+                                   .itemType = quantity::kLeakageCoefficient};
+const Data2DKind kDrainCodeKind{
     .className = "CDrainageCodesSZKvf", .section = "DrainCode", .title = "Drain Codes", .itemType = quantity::kCode};
-const Data2DKind kOptionCodes{.className = "CDrainageDistributedSZKvf",
-                              .section = "DistributedOptionCode",
-                              .title = "Option Distribution",
-                              .itemType = quantity::kCode};
+const Data2DKind kDrainOptionKind{.className = "CDrainageDistributedSZKvf",
+                                  .section = "DistributedOptionCode",
+                                  .title = "Option Distribution",
+                                  .itemType = quantity::kCode};
 
 const Data2DKind kDrainCells{.className = "CGeoDataWM2DKvf",
                              .section = "Distribution",
@@ -54,15 +54,15 @@ Condition DrainageIncluded() { return OnInParent(&CSatZoneKvf::Drainage); }
 CDrainageSZKvf::CDrainageSZKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Drainage", "Drainage", parent) {
   SetPage(kDrainagePage);
   TakesPartWhen(OwnEngine() && DrainageIncluded());
-  NewChild<CData2DKvf>(kLevel);
-  NewChild<CData2DKvf>(kTimeConstant, !Is(DrainageOption, kNoDrainage));
-  NewChild<CData2DKvf>(kCodes, Is(DrainageOption, {kByCodes, kDistributed}));
-  NewChild<CData2DKvf>(kOptionCodes, Is(DrainageOption, kDistributed));
+  NewChild<CData2DKvf>(kDrainLevelKind);
+  NewChild<CData2DKvf>(kTimeConstantKind, !Is(DrainageOption, kNoDrainage));
+  NewChild<CData2DKvf>(kDrainCodeKind, Is(DrainageOption, {kByCodes, kDistributed}));
+  NewChild<CData2DKvf>(kDrainOptionKind, Is(DrainageOption, kDistributed));
 }
 
 void CDrainageSZKvf::ExchangeKeys(KeyExchange& keys) {
   constexpr int kFirstVersionHere = 8;
-  keys.Since(kFirstVersionHere)("DrainageOption", DrainageOption).OneOf(kDrainageOptions);
+  keys.Since(kFirstVersionHere)("DrainageOption", DrainageOption).OneOf(kSubsurfaceDrainageOptions);
 }
 
 CDrainageMFSZItemKvf::CDrainageMFSZItemKvf(CYbSEKvfBase* parent)

@@ -13,11 +13,11 @@ namespace {
 using Rule = GroundProperty::Rule;
 
 /// A key of the saturated zone.
-Condition ZoneKey(int CSatZoneKvf::*member, std::vector<int> values) {
+Condition KeyOfZone(int CSatZoneKvf::*member, std::vector<int> values) {
   return Is<CSatZoneKvf>([](const CYbSEKvfBase& node) { return node.Important(kSaturatedZone); }, member,
                          std::move(values));
 }
-Condition ZoneFlag(int CSatZoneKvf::*flag) {
+Condition FlagOfZone(int CSatZoneKvf::*flag) {
   return On<CSatZoneKvf>([](const CYbSEKvfBase& node) { return node.Important(kSaturatedZone); }, flag);
 }
 
@@ -40,7 +40,7 @@ Condition BelowGround(std::vector<int> methods) {
 }
 
 Condition AmbientHeadGiven() {
-  return AirFlowModelled() && ZoneKey(&CSatZoneKvf::TypeAmbientWaterHeadInput, {CSatZoneKvf::kDistributedHead});
+  return AirFlowModelled() && KeyOfZone(&CSatZoneKvf::TypeAmbientWaterHeadInput, {CSatZoneKvf::kDistributedHead});
 }
 
 struct ClassAndRule {
@@ -68,20 +68,20 @@ ClassAndRule Told(Rule rule) {
       return transport(TransportProperty::VerticalDispersivity);
     case Rule::AirFlowOfLayers:
       return {"CGeoDataMod2DPWCKvf",
-              AmbientHeadGiven() && ZoneKey(&CSatZoneKvf::TypeOfVerDiscr, {CSatZoneKvf::kAsGeology})};
+              AmbientHeadGiven() && KeyOfZone(&CSatZoneKvf::TypeOfVerDiscr, {CSatZoneKvf::kAsGeology})};
     case Rule::AirFlowOfComputation:
       return {"CGeoDataMod2DPWCKvf",
-              AmbientHeadGiven() && !ZoneKey(&CSatZoneKvf::TypeOfVerDiscr, {CSatZoneKvf::kAsGeology})};
+              AmbientHeadGiven() && !KeyOfZone(&CSatZoneKvf::TypeOfVerDiscr, {CSatZoneKvf::kAsGeology})};
     case Rule::Anisotropy:
       return {"CGeoDataMod2DAnisoKvf", AnyModflow()};
     case Rule::VanGenuchten:
       return {"CGeoDataMod2DVanGenuchtenKvf", VariablySaturated()};
     case Rule::BrooksCorey:
       return {"CGeoDataMod2DBrooksCoreyKvf",
-              VariablySaturated() && ZoneKey(&CSatZoneKvf::TypeOfRelPerm, {CSatZoneKvf::kBrooksCorey})};
+              VariablySaturated() && KeyOfZone(&CSatZoneKvf::TypeOfRelPerm, {CSatZoneKvf::kBrooksCorey})};
     case Rule::Rewetting:
       return {"CGeoDataMod2DWETDRYKvf", AnyModflow() && ModflowComponent(&CModModelCompKvf::Subsurface) &&
-                                            SubsurfaceIs({kWithRewetting}) && ZoneFlag(&CSatZoneKvf::Threshold)};
+                                            SubsurfaceIs({kWithRewetting}) && FlagOfZone(&CSatZoneKvf::Threshold)};
   }
   return {};
 }
@@ -113,13 +113,13 @@ Condition TransportNeeds(TransportProperty property) {
     case TransportProperty::Porosity:
       return either;
     case TransportProperty::MatrixPorosity:
-      return water && advection && ZoneFlag(&CSatZoneKvf::MassTransferToImmobileWater);
+      return water && advection && FlagOfZone(&CSatZoneKvf::MassTransferToImmobileWater);
     case TransportProperty::BulkDensity:
       return water && advection && (SorbedSpecies() || BulkDensityTaken());
     case TransportProperty::HorizontalDispersivity:
-      return either && ZoneKey(&CSatZoneKvf::DispersionOption, {CSatZoneKvf::kIsotropy, CSatZoneKvf::kAnisotropy});
+      return either && KeyOfZone(&CSatZoneKvf::DispersionOption, {CSatZoneKvf::kIsotropy, CSatZoneKvf::kAnisotropy});
     case TransportProperty::VerticalDispersivity:
-      return either && ZoneKey(&CSatZoneKvf::DispersionOption, {CSatZoneKvf::kAnisotropy});
+      return either && KeyOfZone(&CSatZoneKvf::DispersionOption, {CSatZoneKvf::kAnisotropy});
   }
   return {};
 }

@@ -10,37 +10,37 @@ namespace tervane {
 
 namespace {
 
-using Zone = CSZVerDiscrInternalBoundaryPropKvf;
+using BoundaryZone = CSZVerDiscrInternalBoundaryPropKvf;
 
-constexpr KeyChoice kBoundaries[] = {{Zone::kNone, "None"},
-                                     {Zone::kFixedHead, "Fixed Head"},
-                                     {Zone::kFixedHeadDrain, "Fixed Head Drain"},
-                                     {Zone::kHeadControlledFlux, "Head-Controlled Flux (GHB)"},
-                                     {Zone::kDrain, "(Reserved for future use)"},
-                                     {Zone::kRiver, "(Reserved for future use)"},
-                                     {Zone::kInactive, "Inactive Cells"}};
+constexpr KeyChoice kBoundaryTypes[] = {{BoundaryZone::kNone, "None"},
+                                        {BoundaryZone::kFixedHead, "Fixed Head"},
+                                        {BoundaryZone::kFixedHeadDrain, "Fixed Head Drain"},
+                                        {BoundaryZone::kHeadControlledFlux, "Head-Controlled Flux (GHB)"},
+                                        {BoundaryZone::kDrain, "(Reserved for future use)"},
+                                        {BoundaryZone::kRiver, "(Reserved for future use)"},
+                                        {BoundaryZone::kInactive, "Inactive Cells"}};
 constexpr const char* kValueLabels[] = {
     "", "Head elevation", "Head elevation", "Controlling head", "Drain elevation", "River stage", ""};
-static_assert(std::size(kValueLabels) == std::size(kBoundaries));
-constexpr KeyChoice kLeakages[] = {{Zone::kConductance, "Total conductance"},
-                                   {Zone::kLeakageCoefficient, "Leakage coefficient"}};
+static_assert(std::size(kValueLabels) == std::size(kBoundaryTypes));
+constexpr KeyChoice kLeakages[] = {{BoundaryZone::kConductance, "Total conductance"},
+                                   {BoundaryZone::kLeakageCoefficient, "Leakage coefficient"}};
 
-constexpr KeyChoice kSources[] = {{ZoneSource::kNone, "None"},
-                                  {ZoneSource::kGridCodes, "Grid codes (.nds2)"},
-                                  {ZoneSource::kPolygons, "Polygons (.shp)"}};
+constexpr KeyChoice kBoundarySources[] = {{ZoneSource::kNone, "None"},
+                                          {ZoneSource::kGridCodes, "Grid codes (.nds2)"},
+                                          {ZoneSource::kPolygons, "Polygons (.shp)"}};
 constexpr ZoneKey kBoundaryKeys[] = {
     {ZonePart::Number, "InternalBoundarySecNumber"}, {ZonePart::Name, "ID"}, {ZonePart::Id, "GridCode"}};
 constexpr CodedZonesKind kBoundaryZones{.className = "CSZVerDiscrInternalBoundaryKvf",
                                         .title = "Internal Boundary Conditions",
                                         .section = "InternalBoundary",
-                                        .source = {.types = kSources,
+                                        .source = {.types = kBoundarySources,
                                                    .type = ZoneSource::kNone,
                                                    .hasGapFill = false,
                                                    .countKey = "NoInternalBoundaries",
                                                    .mayLeaveCells = true,
                                                    .hasGlobalZone = false},
                                         .distribution = std::nullopt,
-                                        .makeZone = MakeZone<Zone>,
+                                        .makeZone = MakeZone<BoundaryZone>,
                                         .page = &kInternalBoundariesPage};
 
 const Data2DKind kLeakageCoefficientKind{.className = "CSZVerDiscrInternalBoundaryPropLeakCoefKvf",
@@ -88,7 +88,7 @@ CSZVerDiscrInternalBoundaryPropKvf::CSZVerDiscrInternalBoundaryPropKvf(CYbSEKvfB
 void CSZVerDiscrInternalBoundaryPropKvf::ExchangeKeys(KeyExchange& keys) {
   CodedZoneProp::ExchangeKeys(keys);
   keys("FixedValue", FixedValue).Quantity(GetBoundaryItemType());
-  keys("BoundaryType", BoundaryType).OneOf(kBoundaries);
+  keys("BoundaryType", BoundaryType).OneOf(kBoundaryTypes);
   keys("Type", Type);
   keys("HeadControlLeakage", HeadControlLeakage).OneOf(kLeakages);
 }

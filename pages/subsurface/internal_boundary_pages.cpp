@@ -11,11 +11,11 @@ namespace tervane {
 
 namespace {
 
-constexpr ZoneSourceWords kWords{.type = "Boundary Condition Distribution Type:",
-                                 .gridFilter =
-                                     "Inner boundary conditions files (*.nds2) |*.nds2|All Files (*.*) "
-                                     "|*.*||",
-                                 .isDomainWanted = true};
+constexpr ZoneSourceWords kInternalBoundaryWords{.type = "Boundary Condition Distribution Type:",
+                                                 .gridFilter =
+                                                     "Inner boundary conditions files (*.nds2) |*.nds2|All Files (*.*) "
+                                                     "|*.*||",
+                                                 .isDomainWanted = true};
 
 void DescribeBoundary(PageForm& form, CSZVerDiscrInternalBoundaryPropKvf& n, CYbSEDlgBase& page) {
   using Zone = CSZVerDiscrInternalBoundaryPropKvf;
@@ -53,7 +53,7 @@ void DescribeBoundary(PageForm& form, CSZVerDiscrInternalBoundaryPropKvf& n, CYb
 
 std::span<const PageRow> InternalBoundaryPages() {
   static constexpr PageRow kRows[] = {
-      PageIs<ZonesPage<kWords>, CodedZonesKvf>(kInternalBoundariesPage),
+      PageIs<ZonesPage<kInternalBoundaryWords>, CodedZonesKvf>(kInternalBoundariesPage),
       DescribedBy<DescribeBoundary>(kInternalBoundaryPage),
   };
   return kRows;

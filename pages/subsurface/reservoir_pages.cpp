@@ -10,7 +10,7 @@ namespace tervane {
 
 namespace {
 
-constexpr ZoneSourceWords kWords{.gridFilter = kZoneGridFilter};
+constexpr ZoneSourceWords kReservoirWords{.gridFilter = kZoneGridFilter};
 
 void DescribeReservoirZone(PageForm& form, CSatZoneSubCatchmentKvf& n) {
   form.Check("Include pumping wells", n.Wells).Revalidates();
@@ -54,9 +54,9 @@ void DescribeReservoir(PageForm& form, CSZDeepGWRoutingReservoirKvf& n) {
 std::span<const PageRow> ReservoirPages() {
   static constexpr PageRow kRows[] = {
       DescribedBy<DescribeReservoirZone>(kReservoirZonePage),
-      PageIs<ZonesPage<kWords>, CodedZonesKvf>(kInterflowZonesPage),
+      PageIs<ZonesPage<kReservoirWords>, CodedZonesKvf>(kInterflowZonesPage),
       DescribedBy<DescribeInterflow>(kInterflowZonePage),
-      PageIs<ZonesPage<kWords>, CodedZonesKvf>(kBaseflowZonesPage),
+      PageIs<ZonesPage<kReservoirWords>, CodedZonesKvf>(kBaseflowZonesPage),
       DescribedBy<DescribeBaseflow>(kBaseflowZonePage),
       DescribedBy<DescribeReservoir>(kBaseflowReservoirPage),
   };

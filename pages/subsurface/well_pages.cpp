@@ -19,7 +19,7 @@ namespace tervane {
 
 namespace {
 
-constexpr const char* kFilter = "Well parameter file (*.WEL)|*.WEL||";
+constexpr const char* kWellFilter = "Well parameter file (*.WEL)|*.WEL||";
 constexpr int kFollowedByTree = kDataChanged | kTreeRebuilt;
 
 /// What is wrong with the wells of a file; empty where nothing is, and without a file.
@@ -41,7 +41,7 @@ class CSZWellDlg : public PageOf<CSZWellKvf> {
  protected:
   void Describe(PageForm& form) override {
     CSZWellKvf& n = Node();
-    form.File("Filename", n.Filename).Filter(kFilter).DefaultExtension("WEL").Hint(kFollowedByTree);
+    form.File("Filename", n.Filename).Filter(kWellFilter).DefaultExtension("WEL").Hint(kFollowedByTree);
     form.Button("Edit...", [this] { Edit(); });
     form.Button("Create...", [this] { Create(); }).Beside();
     if (auto* zone = n.Important(kSaturatedZone))
@@ -77,7 +77,7 @@ class CSZWellDlg : public PageOf<CSZWellKvf> {
     CSZWellKvf& n = Node();
     Host::FileQuestion question;
     question.title = "Create Well File";
-    question.filter = kFilter;
+    question.filter = kWellFilter;
     question.defaultExtension = "WEL";
     const auto file = CreateFileByDialog(*this, std::move(question), n.Filename,
                                          [&n](const std::string& path) { return n.CreateWellFile(path); });
