@@ -44,6 +44,15 @@ struct ValueScale {
   bool operator==(const ValueScale&) const = default;
 };
 
+/// A value of cells that has a meaning of its own.
+struct CellClass {
+  float value = 0;
+  std::string name;
+  unsigned color = 0;  ///< Red, green, blue.
+
+  bool operator==(const CellClass&) const = default;
+};
+
 /// A grid on a map.
 struct GridLayer {
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid;
@@ -54,7 +63,10 @@ struct GridLayer {
   /// Smallest and largest value of all grids that are shown in turn, so that a colour means the same in each.
   std::optional<std::pair<float, float>> range = {};
   std::vector<std::pair<unsigned, std::string>> names = {};  ///< Of codes, for the legend; a code without one is told.
-  bool isHillshaded = false;                                 ///< Of elevations: slopes are lit from the north-west.
+  /// In the place of codes and scales: cells of these values have these colours and names, the legend their order.
+  /// Cells of other values are left out.
+  std::vector<CellClass> classes = {};
+  bool isHillshaded = false;  ///< Of elevations: slopes are lit from the north-west.
 
   bool operator==(const GridLayer&) const = default;
 };

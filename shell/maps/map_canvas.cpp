@@ -66,8 +66,8 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
       // How transparent a layer is, or whether it has a legend, does not change its colours.
       return layer && layer->grid.grid == grid.grid && layer->grid.isCodes == grid.isCodes &&
              layer->grid.highlighted.code == grid.highlighted.code && layer->grid.range == grid.range &&
-             layer->grid.names == grid.names && layer->grid.isHillshaded == grid.isHillshaded &&
-             layer->unitKey == unitKey;
+             layer->grid.names == grid.names && layer->grid.classes == grid.classes &&
+             layer->grid.isHillshaded == grid.isHillshaded && layer->unitKey == unitKey;
     });
     if (same != old.end()) {
       layers_.push_back(std::move(*same));
@@ -233,9 +233,13 @@ QString MapCanvas::TextAt(MapPoint place) const {
   if (pick.cell) {
     text += "   " + tr("cell %1, %2").arg(pick.cell->first).arg(pick.cell->second);
     const GridLayer& layer = content_.grids.front();
-    text += "   " + (pick.value ? ShownUnit(layer.grid->ItemType(), layer.grid->ItemUnit(), &units_)
-                                      .Value(static_cast<double>(*pick.value))
-                                : tr("no value"));
+    const auto own = std::ranges::find_if(layer.classes, [&](const auto& each) { return pick.value == each.value; });
+    if (own != layer.classes.end())
+      text += "   " + ToQt(own->name);
+    else
+      text += "   " + (pick.value ? ShownUnit(layer.grid->ItemType(), layer.grid->ItemUnit(), &units_)
+                                        .Value(static_cast<double>(*pick.value))
+                                  : tr("no value"));
   }
   if (pick.shape) {
     const QString value = ToQt(pick.shapeValue);

@@ -74,6 +74,13 @@ void MapCanvas::mouseMoveEvent(QMouseEvent* event) {
 }
 
 void MapCanvas::mouseReleaseEvent(QMouseEvent* event) {
+  // A point that is asked for may be given by either button.
+  const bool asksPoint = request_ && request_->kind == MapRequest::Kind::Point;
+  if (event->button() == Qt::RightButton && asksPoint && window_.rect.contains(event->position())) {
+    TakeClick(window_.ToMap(event->position()));
+    isTaken_ = false;  // no double click follows
+    return;
+  }
   if (event->button() != Qt::LeftButton) return QWidget::mouseReleaseEvent(event);
   const Gesture gesture = std::exchange(gesture_, Gesture::None);
   SyncCursor();

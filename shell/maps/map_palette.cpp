@@ -200,6 +200,8 @@ MapPalette MapPalette::Of(const GridLayer& layer, const DisplayUnits* units) {
   palette.colors_ = {qRgba(0, 0, 0, 0)};
   if (layer.highlighted.code)
     palette.MakeHighlighted(layer);
+  else if (!layer.classes.empty())
+    palette.MakeOwnClasses(layer.classes);
   else if (layer.isCodes)
     palette.MakeCodes(layer);
   else
@@ -278,6 +280,16 @@ void MapPalette::MakeHighlighted(const GridLayer& layer) {
   legend_.Add(QColor(kOthers), QCoreApplication::translate("MapPalette", "others"));
 }
 
+void MapPalette::MakeOwnClasses(const std::vector<CellClass>& classes) {
+  kind_ = Kind::OwnClasses;
+  for (const CellClass& each : classes) {
+    if (ownValues_.size() == kMostColors) return;
+    ownValues_.push_back(each.value);
+    colors_.push_back(qRgb(0, 0, 0) | each.color);
+    legend_.Add(QColor(colors_.back()), ToQt(each.name));
+  }
+}
+
 std::uint8_t MapPalette::ColorNumber(float value) const {
   if (value == deleteValue_ || value != value) return 0;
   switch (kind_) {
@@ -291,6 +303,10 @@ std::uint8_t MapPalette::ColorNumber(float value) const {
       const auto found = std::ranges::lower_bound(codes_, whole);
       if (found == codes_.end() || *found != whole) return 0;
       return static_cast<std::uint8_t>(1 + (found - codes_.begin()) % kMostColors);
+    }
+    case Kind::OwnClasses: {
+      const auto found = std::ranges::find(ownValues_, value);
+      return found == ownValues_.end() ? std::uint8_t{0} : static_cast<std::uint8_t>(1 + (found - ownValues_.begin()));
     }
     case Kind::Classes:
       break;

@@ -102,11 +102,12 @@ class MapPalette {
   bool KeepsSingleCells() const { return kind_ != Kind::Classes; }
 
  private:
-  enum class Kind { Classes, Codes, Highlighted };
+  enum class Kind { Classes, Codes, Highlighted, OwnClasses };
 
   void MakeClasses(const GridLayer& layer, const ShownUnit& unit);
   void MakeCodes(const GridLayer& layer);
   void MakeHighlighted(const GridLayer& layer);
+  void MakeOwnClasses(const std::vector<CellClass>& classes);
 
   Kind kind_ = Kind::Classes;
   float deleteValue_ = 0;
@@ -115,6 +116,7 @@ class MapPalette {
   std::vector<unsigned> codes_;
   std::vector<std::uint8_t> colorOfCode_;  ///< By the code, of small codes.
   float highlighted_ = 0;
+  std::vector<float> ownValues_;  ///< Of the classes that a layer has itself.
   std::vector<QRgb> colors_;
   LegendBlock legend_;
 };
