@@ -4,7 +4,7 @@
 
 #include <string>
 
-#include "core/node.h"
+#include "core/list.h"
 
 namespace tervane {
 
@@ -22,6 +22,25 @@ class NamedItemKvf : public CYbSEKvfGroupBase {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys("Name", Name); }
+};
+
+/// A list of items with names, which other lists take them from.
+template <class Item>
+class NamedListKvf : public CYbSEKvfListBase<Item>, public CYbSEItemNameSource {
+ public:
+  using CYbSEKvfListBase<Item>::CYbSEKvfListBase;
+
+  std::string GetItemName(int number) const override {
+    const Item* item = this->GetItem(number);
+    return item ? item->Name : std::string();
+  }
+
+ protected:
+  /// A new list of layers has one.
+  void BeginWithAquifer() {
+    this->SetItemCount(1, 1);
+    this->GetItem(1)->Name = "Aquifer";
+  }
 };
 
 }  // namespace tervane

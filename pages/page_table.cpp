@@ -11,8 +11,11 @@
 #include "pages/spatial/domain_pages.h"
 #include "pages/spatial/station_pages.h"
 #include "pages/spatial/zone_pages.h"
+#include "pages/subsurface/computational_layer_pages.h"
 #include "pages/subsurface/drainage_pages.h"
+#include "pages/subsurface/geology_pages.h"
 #include "pages/subsurface/internal_boundary_pages.h"
+#include "pages/subsurface/outer_boundary_pages.h"
 #include "pages/subsurface/reservoir_pages.h"
 #include "pages/subsurface/saturated_zone_pages.h"
 #include "pages/subsurface/unsaturated_zone_pages.h"
@@ -52,6 +55,9 @@ constexpr PageFile kFiles[] = {
     {"surface", RiverPages},
     {"subsurface", UnsaturatedZonePages},
     {"subsurface", SaturatedZonePages},
+    {"subsurface", GeologyPages},
+    {"subsurface", ComputationalLayerPages},
+    {"subsurface", OuterBoundaryPages},
     {"subsurface", DrainagePages},
     {"subsurface", WellPages},
     {"subsurface", ReservoirPages},

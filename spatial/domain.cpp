@@ -12,6 +12,8 @@
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "platform/units.h"
+#include "spatial/data2d.h"
+#include "spatial/domain_boundary.h"
 #include "spatial/pages.h"
 
 namespace tervane {
@@ -108,6 +110,29 @@ std::shared_ptr<ComputedGrid> CCatchmentKvf::DomainFromShape() {
                                          });
   madeOf_ = std::move(source);
   return made_;
+}
+
+std::shared_ptr<Computed<TracedDomain>> CCatchmentKvf::Traced() {
+  const bool isShape = Type == kShapeFile;
+  const GridSource file = isShape ? GridSource() : CodesOfGrid(*gridFile_);
+  const std::shared_ptr<ComputedGrid> shape = isShape ? DomainFromShape() : nullptr;
+  if (trace_.traced && trace_.file == file && trace_.shape == shape) return trace_.traced;
+  trace_ = {file, shape,
+            std::make_shared<Computed<TracedDomain>>(
+                "Tracing the boundary of the model domain", [file, shape](TracedDomain& made, ProgressPart progress) {
+                  CTvn2DOrthoRotatedGridData& grid = made.grid;
+                  if (shape) {
+                    shape->Run(progress);
+                    if (!shape->Result()) return FileResult{shape->Problem(), {}};
+                    grid = *shape->Result();
+                  } else if (FileResult result = BuildGrid(file, progress, grid); !result.Ok()) {
+                    return result;
+                  }
+                  if (!made.grid.PrepareBoundary(made.fault) && made.fault.empty())
+                    made.fault = "The cells of the outer boundary make no closed line around the model";
+                  return FileResult();
+                })};
+  return trace_.traced;
 }
 
 std::shared_ptr<const CYbShapeData> CCatchmentKvf::GetDomainShape(std::string* problem) const {

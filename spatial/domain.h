@@ -20,6 +20,8 @@ class DomainFollower {
 };
 inline constexpr ImportantName<DomainFollower> kDomainFollower{"OVERLAY_DATA"};
 
+struct TracedDomain;
+
 /// The model domain and its grid: a grid file, or the polygons of a shape file on a grid that is given here. A cell of
 /// the domain is empty outside, 1 inside, 2 at the outer boundary.
 class CCatchmentKvf : public CTvnKvfBase {
@@ -51,6 +53,9 @@ class CCatchmentKvf : public CTvnKvfBase {
   std::shared_ptr<CTvn2DOrthoRotatedGridData> GetDomainFromShape(std::string* problem = nullptr) const;
   /// The making of that: another one when what decides it has changed. It asks no node.
   std::shared_ptr<ComputedGrid> DomainFromShape();
+  /// The domain with its outer boundary traced, for all that lie on it: another one when what decides the domain has
+  /// changed. It asks no node. It has no result where the domain cannot be read.
+  std::shared_ptr<Computed<TracedDomain>> Traced();
   /// The shape file, for drawing; null when it cannot be read.
   std::shared_ptr<const CYbShapeData> GetDomainShape(std::string* problem = nullptr) const;
 
@@ -87,6 +92,12 @@ class CCatchmentKvf : public CTvnKvfBase {
   CData2DShpFile* shapeFile_;
   ShapeSource madeOf_;
   std::shared_ptr<ComputedGrid> made_;
+  /// What was traced: a grid file, or the domain of a shape file.
+  struct {
+    GridSource file;
+    std::shared_ptr<ComputedGrid> shape;
+    std::shared_ptr<Computed<TracedDomain>> traced;
+  } trace_;
 };
 inline constexpr ImportantName<CCatchmentKvf> kDomain{"CATCHMENT"};
 

@@ -27,9 +27,6 @@ int NumberOf(GridCell cell, GridCell other) {
   return 0;
 }
 
-// What painting and a traced grid hold in the place of the codes.
-constexpr float kUnpaintedBoundary = -1.0F, kInside = -2.0F, kOutside = -3.0F;
-
 }  // namespace
 
 std::size_t CGeoDataBoundCondCatchmentData::IndexOf(GridCell cell) const {

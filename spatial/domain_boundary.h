@@ -21,11 +21,16 @@ struct GridCell {
 struct BoundaryItem {
   std::optional<MapPoint> point;  ///< Nothing while a coordinate is undefined.
   int type = 0;
+
+  bool operator==(const BoundaryItem&) const = default;
 };
 
 /// The domain grid with its outer boundary, traced cell by cell: clockwise, with the model on the right.
 class CGeoDataBoundCondCatchmentData : public CTvn2DOrthoRotatedGridData {
  public:
+  // What painting and a traced grid hold in the place of the codes.
+  static constexpr float kUnpaintedBoundary = -1.0F, kInside = -2.0F, kOutside = -3.0F;
+
   GridCell StartCell;
   std::vector<GridCell> BoundaryCells;   ///< In the order of the trace.
   std::vector<MapPoint> BoundaryPoints;  ///< Of the conditions that were painted last.
@@ -53,6 +58,12 @@ class CGeoDataBoundCondCatchmentData : public CTvn2DOrthoRotatedGridData {
   int CodeAt(GridCell cell) const;
   std::size_t IndexOf(GridCell cell) const;
   void Paint(const std::vector<BoundaryItem>& items, bool byNumber);
+};
+
+/// The domain of a setup after it was traced.
+struct TracedDomain {
+  CGeoDataBoundCondCatchmentData grid;
+  std::string fault;  ///< Why its boundary could not be followed; empty where it could.
 };
 
 }  // namespace tervane

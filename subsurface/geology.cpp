@@ -87,6 +87,22 @@ constexpr std::array kLenseProperties{
     AsInLayers("LVVDispCoeff"),
     AsInLayers("THVDispCoeff")};
 
+void CopyValues(const CData2DKvf& from, CData2DKvf& to) {
+  to.Type = from.Type;
+  to.FixedValue = from.FixedValue;
+  to.InterpMethod = from.InterpMethod;
+  to.SearchRadius = from.SearchRadius;
+  to.ShowGridData = from.ShowGridData;
+  to.ShowShapeData = from.ShowShapeData;
+  to.ShapeAxisUnit = from.ShapeAxisUnit;
+  to.ShapeItemUnit = from.ShapeItemUnit;
+  to.RelativeToGround = from.RelativeToGround;
+  to.GridFile().File = from.GridFile().File;
+  to.GridFile().Items = from.GridFile().Items;
+  to.ShapeFile().Choose(from.ShapeFile().File, from.ShapeFile().Attribute());
+  to.XyzFile().File = from.XyzFile().File;
+}
+
 }  // namespace
 
 // ---- Units
@@ -110,6 +126,7 @@ void CGeoUnitsSZItemKvf::ExchangeKeys(KeyExchange& keys) {
 
 CGeoUnitsSZListKvf::CGeoUnitsSZListKvf(CYbSEKvfBase* parent)
     : CYbSEKvfListBase("Geological units", "GeoUnitsSZProperties", parent) {
+  SetPage(kGeologicalUnitsPage);
   TakesPartWhen(GroundParametersBy(CSatZoneKvf::kByUnits));
 }
 
@@ -119,8 +136,6 @@ CGeoLayerSZItemKvf::CGeoLayerSZItemKvf(CYbSEKvfBase* parent)
     : NamedItemKvf("GeoLayerSZItem", "Layer_%d", "Layer", parent) {
   SetHelp("Top.chm", "Geological_Layer.htm");
   SetPage(kHelpPage);
-  // Not by its important name, which it has not got yet when its first layer is made.
-  if (auto* zone = parent ? dynamic_cast<CSatZoneKvf*>(parent->GetParent()) : nullptr) id = zone->id++;
   MakeProperties(*this, kLayerProperties, false);
 }
 
@@ -131,6 +146,12 @@ void CGeoLayerSZItemKvf::ExchangeKeys(KeyExchange& keys) {
   keys("id", id);
 }
 
+void CopyProperties(const CGeoLayerSZItemKvf& from, CGeoLayerSZItemKvf& to) {
+  for (const GroundProperty& row : kLayerProperties)
+    if (std::string_view(row.section) != "LowerLevel")
+      CopyValues(*PropertyOf(from, row.section), *PropertyOf(to, row.section));
+}
+
 CGeoLenseSZItemKvf::CGeoLenseSZItemKvf(CYbSEKvfBase* parent)
     : NamedItemKvf("GeoLenseSZItem", "Lense_%d", "Lense", parent) {
   SetHelp("Top.chm", "Geological_Lense.htm");
@@ -138,10 +159,22 @@ CGeoLenseSZItemKvf::CGeoLenseSZItemKvf(CYbSEKvfBase* parent)
   MakeProperties(*this, kLenseProperties, true);
 }
 
-CGeoLayerSZKvf::CGeoLayerSZKvf(CYbSEKvfBase* parent) : NamedListKvf("Geological Layers", "GeoLayersSZ", parent) {
+CGeoLayerSZKvf::CGeoLayerSZKvf(int& nextId, CYbSEKvfBase* parent)
+    : NamedListKvf("Geological Layers", "GeoLayersSZ", parent), nextId_(nextId) {
+  SetPage(kGeologicalLayersPage);
   BeginWithAquifer();
 }
 
-CGeoLenseSZKvf::CGeoLenseSZKvf(CYbSEKvfBase* parent) : NamedListKvf("Geological Lenses", "GeoLensesSZ", parent) {}
+std::unique_ptr<CYbSEKvfBase> CGeoLayerSZKvf::NewItemNode() {
+  auto layer = NewItem();
+  layer->id = nextId_;
+  // A file may hold the highest number.
+  nextId_ = static_cast<int>(static_cast<unsigned>(nextId_) + 1U);
+  return layer;
+}
+
+CGeoLenseSZKvf::CGeoLenseSZKvf(CYbSEKvfBase* parent) : NamedListKvf("Geological Lenses", "GeoLensesSZ", parent) {
+  SetPage(kGeologicalLensesPage);
+}
 
 }  // namespace tervane

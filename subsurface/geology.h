@@ -6,7 +6,6 @@
 
 #include <string>
 
-#include "core/list.h"
 #include "core/named_item.h"
 #include "subsurface/ground_properties.h"
 
@@ -48,7 +47,6 @@ class CGeoUnitsSZListKvf : public CYbSEKvfListBase<CGeoUnitsSZItemKvf> {
 /// A geological layer: it reaches from the level of the one above, or the ground, down to its own.
 class CGeoLayerSZItemKvf : public NamedItemKvf {
  public:
-  /// Takes the next number of the saturated zone.
   explicit CGeoLayerSZItemKvf(CYbSEKvfBase* parent);
 
   int id = 0;  ///< No two layers of a setup ever had the same.
@@ -59,37 +57,28 @@ class CGeoLayerSZItemKvf : public NamedItemKvf {
   void ExchangeKeys(KeyExchange& keys) override;
 };
 
+/// Gives the values, files and options of a layer's properties to another one, whose lower level stays.
+void CopyProperties(const CGeoLayerSZItemKvf& from, CGeoLayerSZItemKvf& to);
+
 /// A body inside the layers.
 class CGeoLenseSZItemKvf : public NamedItemKvf {
  public:
   explicit CGeoLenseSZItemKvf(CYbSEKvfBase* parent);
 };
 
-/// A list of items with names, which other lists take them from.
-template <class Item>
-class NamedListKvf : public CYbSEKvfListBase<Item>, public CYbSEItemNameSource {
- public:
-  using CYbSEKvfListBase<Item>::CYbSEKvfListBase;
-
-  std::string GetItemName(int number) const override {
-    const Item* item = this->GetItem(number);
-    return item ? item->Name : std::string();
-  }
-
- protected:
-  /// A new list of layers has one.
-  void BeginWithAquifer() {
-    this->SetItemCount(1, 1);
-    this->GetItem(1)->Name = "Aquifer";
-  }
-};
-
 class CGeoLayerSZKvf : public NamedListKvf<CGeoLayerSZItemKvf> {
  public:
-  explicit CGeoLayerSZKvf(CYbSEKvfBase* parent);
+  /// Layers take their numbers from the counter `nextId` of the owner.
+  CGeoLayerSZKvf(int& nextId, CYbSEKvfBase* parent);
+
+  /// A layer with a number of its own. One that never stands in the list, made by `NewItem`, takes none.
+  std::unique_ptr<CYbSEKvfBase> NewItemNode() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("NumberOfLayers", *this); }
+
+ private:
+  int& nextId_;
 };
 inline constexpr ImportantName<CGeoLayerSZKvf> kGeologicalLayers{"SZGEOLAYERS"};
 

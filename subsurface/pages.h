@@ -10,6 +10,13 @@ namespace tervane {
 
 inline constexpr PageClass kUnsaturatedZonePage{"CUnsatzoneDlg", 0};
 inline constexpr PageClass kSaturatedZonePage{"CSatZoneDlg", 0};
+inline constexpr PageClass kGeologicalUnitsPage{"CGeoUnitsSZListDlg", 0};
+inline constexpr PageClass kGeologicalLayersPage{"CGeoLayerSZDlg", 0};
+inline constexpr PageClass kGeologicalLensesPage{"CGeoLenseSZDlg", 0};
+inline constexpr PageClass kComputationalLayersPage{"CSZVerDiscrLayerListDlg", 0};
+inline constexpr PageClass kComputationalLayersOfGeologyPage{"CSZVerDiscrLayerGeoListDlg", 0};
+inline constexpr PageClass kOuterBoundaryPage{"CGeoDataBoundCondListDlg", 0};
+inline constexpr PageClass kBoundarySegmentPage{"CGeoDataBoundCondItemDlg", 0};
 
 inline constexpr PageClass kDrainagePage{"CDrainageSZDlg", 0};
 inline constexpr PageClass kModflowDrainsPage{"CDrainageMFSZDlg", 0};

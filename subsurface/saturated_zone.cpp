@@ -2,9 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "subsurface/saturated_zone.h"
 
+#include <fmt/format.h>
+
+#include "core/kvf.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/conditions.h"
 #include "spatial/domain.h"
+#include "subsurface/computational_layers.h"
 #include "subsurface/drainage.h"
 #include "subsurface/geology.h"
 #include "subsurface/ground_layers.h"
@@ -34,6 +38,16 @@ const Data2DKind kAirFlowHead{.className = "CGeoDataMod2DZWTKvf",
                               .title = "Head elevation used as ref. for air flow simulation",
                               .itemType = quantity::kElevation};
 
+/// A boundary list with segments that takes part; null where there is none.
+template <class List>
+CGeoDataBoundCondListKvf* BoundaryInUse(const List& layers) {
+  for (int number = 1; number <= layers.GetItemCount(); ++number) {
+    CGeoDataBoundCondListKvf& boundary = layers.GetItem(number)->OuterBoundary();
+    if (boundary.GetItemCount() > 0 && boundary.IsDataUsedInSetup()) return &boundary;
+  }
+  return nullptr;
+}
+
 }  // namespace
 
 CSatZoneKvf::CSatZoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Saturated Zone", "SaturatedZone", parent) {
@@ -41,9 +55,11 @@ CSatZoneKvf::CSatZoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Saturated Zone", 
   TakesPartWhen(
       (OwnEngine() && Component(&CModelCompKvf::SZ) && !Method(&CModelCompKvf::SZ_ModelType, kLinearReservoir)) ||
       (AnyModflow() && ModflowComponent(&CModModelCompKvf::Subsurface)));
-  NewChild<CGeoUnitsSZListKvf>();
-  NewImportantChild<CGeoLayerSZKvf>(kGeologicalLayers);
+  units_ = NewChild<CGeoUnitsSZListKvf>();
+  layers_ = NewImportantChild<CGeoLayerSZKvf>(kGeologicalLayers, id);
   NewImportantChild<CGeoLenseSZKvf>(kGeologicalLenses);
+  ownLayers_ = NewChild<CSZVerDiscrLayerListKvf>();
+  layersOfGeology_ = NewImportantChild<CSZVerDiscrLayerGeoListKvf>(kComputationalLayersOfGeology);
   NewImportantChild<CDrainageSZKvf>(kDrainage);
   NewImportantChild<CDrainageMFSZKvf>(kModflowDrains);
   NewImportantChild<CSZWellKvf>(kWells, Wells);
@@ -80,6 +96,19 @@ const std::string& CSatZoneKvf::GetTitle() const {
   static const std::string withModflow = "Subsurface";
   const auto* basics = Important(kBasicParameters);
   return basics && basics->ModelType != kEngineTervane ? withModflow : CYbSEKvfBase::GetTitle();
+}
+
+int CSatZoneKvf::ValidateData() {
+  if (TypeOfVerDiscr == kAsGeology && layers_->GetItemCount() != layersOfGeology_->GetItemCount())
+    AddWarning("Computational layers do not follow the geological layers", "TypeOfVerDiscr",
+               fmt::format("computational layers: {}, geological layers: {}; the page of the geological layers brings "
+                           "them in step",
+                           layersOfGeology_->GetItemCount(), layers_->GetItemCount()));
+  CGeoDataBoundCondListKvf* boundary = BoundaryInUse(*layersOfGeology_);
+  if (!boundary) boundary = BoundaryInUse(*ownLayers_);
+  if (boundary && !boundary->LoadDomain() && !boundary->GetTraceFault().empty())
+    AddWarning("Outer boundary conditions have no place on the model domain", {}, boundary->GetTraceFault());
+  return 1;
 }
 
 void CSatZoneKvf::ExchangeKeys(KeyExchange& keys) {

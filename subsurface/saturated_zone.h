@@ -4,10 +4,17 @@
 // The aquifer: how its geology is told and what it is divided into for the computation.
 #pragma once
 
+#include <string>
+
 #include "spatial/cell_checks.h"
 #include "spatial/geo_data.h"
 
 namespace tervane {
+
+class CGeoLayerSZKvf;
+class CGeoUnitsSZListKvf;
+class CSZVerDiscrLayerGeoListKvf;
+class CSZVerDiscrLayerListKvf;
 
 /// Flags are 0 or 1.
 class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution, public CellChecker {
@@ -33,6 +40,13 @@ class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution, pub
   int Threshold = 0;
   int MassTransferToImmobileWater = 0;
 
+  CGeoUnitsSZListKvf& Units() const { return *units_; }
+  CGeoLayerSZKvf& Layers() const { return *layers_; }
+  /// The computational layers that have lower levels of their own.
+  CSZVerDiscrLayerListKvf& OwnLayers() const { return *ownLayers_; }
+  /// Those that follow the geological layers.
+  CSZVerDiscrLayerGeoListKvf& LayersOfGeology() const { return *layersOfGeology_; }
+
   /// That levels lie in order, heads and screens in the ground, and that codes have a unit.
   std::vector<CellCheck> CurrentChecks() const override;
   /// With a Modflow engine the zone is called another name.
@@ -42,8 +56,18 @@ class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution, pub
   bool AddWellOverlaySection(KvfFile* file, std::string& error) const;
   const int& TypeOfGeoParaDistribution() const override { return ParameterDistribution; }
 
+  /// Two findings of the whole: a domain whose boundary cannot be traced where segments lie on it, and computational
+  /// layers that are not as many as the geological layers that they follow.
+  int ValidateData() override;
+
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  CGeoUnitsSZListKvf* units_;
+  CGeoLayerSZKvf* layers_;
+  CSZVerDiscrLayerListKvf* ownLayers_;
+  CSZVerDiscrLayerGeoListKvf* layersOfGeology_;
 };
 inline constexpr ImportantName<CSatZoneKvf> kSaturatedZone{"SATZONE"};
 

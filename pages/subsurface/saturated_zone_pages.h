@@ -8,6 +8,12 @@
 
 namespace tervane {
 
+class CSatZoneKvf;
+
+/// The options of vertical discretization and the least thickness, on the page of the zone itself and on those of its
+/// computational layers: with uniform layers, the latter are not in the tree. Gives the control of the options.
+Control& DescribeVerticalDiscretization(PageForm& form, CSatZoneKvf& zone);
+
 /// The page of the saturated zone.
 std::span<const PageRow> SaturatedZonePages();
 

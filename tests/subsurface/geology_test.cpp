@@ -3,6 +3,7 @@
 #include "subsurface/geology.h"
 
 #include <functional>
+#include <limits>
 
 #include <gmock/gmock.h>
 
@@ -187,6 +188,45 @@ TEST(Geology, LayersAreNumberedOnceAndForAll) {
   EXPECT_EQ(read.Written("SaturatedZone/GeoLayersSZ/Layer_2:id"), "8");
   EXPECT_EQ(read.Root().Important(kGeologicalLayers)->GetItemName(1), "Clay");
   EXPECT_EQ(read.Root().Important(kGeologicalLayers)->GetItemName(4), "");
+}
+
+TEST(Geology, ARowThatOnlyStandsForAllTakesNoNumber) {
+  test::TestSetup setup;
+  auto& zone = setup.At<CSatZoneKvf>("SaturatedZone");
+  zone.Layers().NewItem();
+  EXPECT_EQ(zone.id, 2);
+  zone.id = std::numeric_limits<int>::max();
+  EXPECT_EQ(zone.Layers().AddItem()->id, std::numeric_limits<int>::max());
+}
+
+TEST(Geology, TheLaterOfTwoCountsOfLayersHolds) {
+  const auto count = [](const std::string& keys) {
+    test::TestSetup setup("section SaturatedZone {\nsection GeoLayersSZ {\n" + keys + "}\n}");
+    return setup.At<CSatZoneKvf>("SaturatedZone").Layers().GetItemCount();
+  };
+  EXPECT_EQ(count("NumberOfLayers = 3\n"), 3);
+  EXPECT_EQ(count("YbSEKvfListItemCount = 2\n"), 2);
+  EXPECT_EQ(count("NumberOfLayers = 3\nYbSEKvfListItemCount = 2\n"),
+            count("YbSEKvfListItemCount = 2\nNumberOfLayers = 3\n"));
+}
+
+TEST(Geology, PropertiesAreCopiedWithTheirFilesButNotTheLowerLevel) {
+  test::TestSetup setup;
+  CGeoLayerSZKvf& layers = setup.At<CSatZoneKvf>("SaturatedZone").Layers();
+  CGeoLayerSZItemKvf& from = *layers.GetItem(1);
+  CGeoLayerSZItemKvf& to = *layers.AddItem();
+  PropertyOf(from, "LowerLevel")->FixedValue = -40;
+  PropertyOf(from, "HorHydrCon")->Type = CData2DKvf::kGridFile;
+  PropertyOf(from, "HorHydrCon")->GridFile().File = FileName("k.nds2", "/setups");
+  PropertyOf(from, "HorHydrCon")->GridFile().Items = {2};
+  PropertyOf(from, "SpecificYield")->FixedValue = 0.3F;
+  CopyProperties(from, to);
+  EXPECT_EQ(PropertyOf(to, "LowerLevel")->FixedValue, 0);
+  EXPECT_EQ(PropertyOf(to, "HorHydrCon")->Type, CData2DKvf::kGridFile);
+  EXPECT_EQ(PropertyOf(to, "HorHydrCon")->GridFile().File.Text(), "k.nds2");
+  EXPECT_EQ(PropertyOf(to, "HorHydrCon")->GridFile().SelectedItem(), 2);
+  EXPECT_EQ(PropertyOf(to, "SpecificYield")->FixedValue, 0.3F);
+  EXPECT_EQ(to.Name, "Layer");
 }
 
 }  // namespace

@@ -60,5 +60,16 @@ TEST(SaturatedZone, TellsAViewerOfScenesOfItsWells) {
       << text;
 }
 
+TEST(SaturatedZone, IsTheSubsurfaceWithAModflowEngine) {
+  test::TestSetup setup;
+  auto& zone = setup.At<CSatZoneKvf>("SaturatedZone");
+  for (const auto& [engine, title] : {std::pair{kEngineTervane, "Saturated Zone"},
+                                      {kEngineModflowSurfact, "Subsurface"},
+                                      {kEngineModflow2000, "Subsurface"}}) {
+    setup.At<CBasicParaKvf>("SimSpec").ModelType = engine;
+    EXPECT_EQ(zone.GetTitle(), title);
+  }
+}
+
 }  // namespace
 }  // namespace tervane
