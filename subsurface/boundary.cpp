@@ -21,15 +21,15 @@ namespace {
 
 using Segment = CGeoDataBoundCondItemKvf;
 
-constexpr float kUndefined = -1e-31F;
-static_assert(std::bit_cast<std::uint32_t>(kUndefined) == 0x8C01CEB3);
+constexpr float kUndefinedCoordinate = -1e-31F;
+static_assert(std::bit_cast<std::uint32_t>(kUndefinedCoordinate) == 0x8C01CEB3);
 
 /// A coordinate of a file that stands for none, by the version of the file.
 bool MeansUndefined(double coordinate, int version) {
   constexpr int kLastVersionWithDeleteValues = 12;
   if (version <= kLastVersionWithDeleteValues) return std::abs(coordinate - -1e-35) <= 1e-37;
   // The text of a file has fewer digits than the value.
-  constexpr double kUndefinedValue = kUndefined;
+  constexpr double kUndefinedValue = kUndefinedCoordinate;
   return std::abs(coordinate - kUndefinedValue) < std::abs(kUndefinedValue) / 100;
 }
 
@@ -47,7 +47,7 @@ CGeoDataBoundCondItemKvf::CGeoDataBoundCondItemKvf(CYbSEKvfBase* parent)
   gridFile_->SetItemTypeBy(itemType);
 }
 
-double CGeoDataBoundCondItemKvf::GetUndefinedValue() { return kUndefined; }
+double CGeoDataBoundCondItemKvf::GetUndefinedValue() { return kUndefinedCoordinate; }
 
 bool CGeoDataBoundCondItemKvf::HasPoint() const {
   const auto isDefined = [](double coordinate) {
@@ -94,7 +94,7 @@ void CGeoDataBoundCondItemKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Type", Type);
   if (!keys.Section()) return;
   for (double* coordinate : {&X, &Y})
-    if (MeansUndefined(*coordinate, keys.DocVersion())) *coordinate = kUndefined;
+    if (MeansUndefined(*coordinate, keys.DocVersion())) *coordinate = kUndefinedCoordinate;
 }
 
 // ---- The list
