@@ -48,6 +48,9 @@ MapContent BoundaryPicture::Map() {
   if (map.grids.empty()) return map;
   // Neither codes nor amounts, whatever the file of the domain says of its values.
   map.grids.front().isCodes = false;
+  // The boundary is one cell wide: the line around the domain would hide it, and pale colours are lost on it.
+  map.grids.front().transparency = 0;
+  map.domain = nullptr;
   if (by_ == By::Type) map.grids.front().classes = ClassesOfTypes();
   PointLayer starts;
   starts.isNumbered = true;
