@@ -8,6 +8,7 @@
 #include <fmt/format.h>
 
 #include "bench/median_table.h"
+#include "libraries/soils.h"
 #include "libraries/vegetations.h"
 #include "surface/crop_calendar.h"
 #include "surface/vegetation_file.h"
@@ -45,8 +46,18 @@ FileContent LibraryText() {
   return FileContent::Of(text + "}\n");
 }
 
+FileContent SoilText() {
+  std::string text = "target TERVANE_SOILS {\n";
+  for (int i = 1; i <= kVegetations; ++i) {
+    text += fmt::format("  section Soil_{} {{\n    Name = \"Soil {}\"\n    Source = \"survey\"\n", i, i);
+    text += fmt::format("    Retention = \"van Genuchten\", 0.43, 0.078, {}, 1.56\n", 1 + 0.01 * i);
+    text += "    Conductivity = \"Mualem\", 2.889e-6, 0.5\n    BulkDensity = 1511.0\n  }\n";
+  }
+  return FileContent::Of(text + "}\n");
+}
+
 int Run(int argc, char** argv) {
-  const FileContent text = LibraryText();
+  const FileContent text = LibraryText(), soils = SoilText();
   const Rotation large(100'000), small(10'000);
   const auto calendarOf = [](const Rotation& rotation) {
     return BuildVegCalendar(rotation.planned, kEntireScheme, rotation.end);
@@ -61,6 +72,13 @@ int Run(int argc, char** argv) {
     if (const std::string error = ParseLibrary(text, "large.etv", library); !error.empty()) fmt::print("{}\n", error);
     return library;
   });
+  table.Add("read and check a library of 1,000 soils", [&] {
+    Library library(kSoilLibrary);
+    if (const std::string error = ParseLibrary(soils, "large.uzs", library); !error.empty()) fmt::print("{}\n", error);
+    if (!FindingsOf(library).empty()) fmt::print("the soils have findings\n");
+    return library;
+  });
+  table.LimitTime("read and check a library of 1,000 soils", 20);
   table.LimitTime("calendar of 100,000 crops", 20);
   table.Limit("calendar of 100,000 crops", "calendar of 10,000 crops", 12);
   table.LimitTime("read a library of 1,000 vegetations", 20);

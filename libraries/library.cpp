@@ -36,6 +36,7 @@ void CheckRows(const LibraryKind& kind, const LibraryEntry& entry, std::size_t p
     findings.push_back({Severity::Error, line, place, row, std::move(text)});
   };
   for (const auto& [line, text] : entry.refused) findings.push_back({Severity::Error, line, place, {}, text});
+  const std::size_t before = findings.size();
   for (std::size_t i = 0; i < kind.fields.size(); ++i) {
     const LibraryField& field = kind.fields[i];
     const LibraryModel* model = ModelOf(field, entry.fields[i].text);
@@ -46,6 +47,8 @@ void CheckRows(const LibraryKind& kind, const LibraryEntry& entry, std::size_t p
         if (std::string fault = WhyWrong(model->parameters[parameter], entry.Number(i, parameter)); !fault.empty())
           add({}, std::move(fault));
   }
+  if (kind.whyWrongFields && findings.size() == before)
+    if (std::string fault = kind.whyWrongFields(entry); !fault.empty()) add({}, std::move(fault));
   if (kind.HasRows() && !kind.HasRowSections() && entry.rows.empty())
     add({}, fmt::format("it has no {}", kind.rowNames));
   for (std::size_t i = 0; i < entry.rows.size(); ++i) {
@@ -150,13 +153,25 @@ void ChooseModel(const LibraryModel& model, LibraryText& text) {
 std::string WhyWrong(const LibraryColumn& column, double value) {
   const std::string unit = column.unit.empty() ? std::string() : fmt::format(" {}", column.unit);
   std::string expected = fmt::format("a {}number ", column.isWhole ? "whole " : "");
-  expected += column.most < std::numeric_limits<double>::max()
-                  ? fmt::format("from {} to {}{}", ShortestNumber(column.least), ShortestNumber(column.most), unit)
-                  : fmt::format("from {}{} on", ShortestNumber(column.least), unit);
-  const bool isGood = value >= column.least && value <= column.most && (!column.isWhole || value == std::floor(value));
+  const bool hasMost = column.most < std::numeric_limits<double>::max();
+  if (column.isLeastOutside)
+    expected += fmt::format("above {}{}{}", ShortestNumber(column.least),
+                            hasMost ? " and up to " + ShortestNumber(column.most) : std::string(), unit);
+  else
+    expected += hasMost
+                    ? fmt::format("from {} to {}{}", ShortestNumber(column.least), ShortestNumber(column.most), unit)
+                    : fmt::format("from {}{} on", ShortestNumber(column.least), unit);
+  const bool isInside = (column.isLeastOutside ? value > column.least : value >= column.least) && value <= column.most;
+  const bool isGood = isInside && (!column.isWhole || value == std::floor(value));
   if (isGood) return {};
   const std::string shown = std::isnan(value) ? std::string("missing") : ShortestNumber(value);
   return fmt::format("{} is {}, {} was expected", column.head, shown, expected);
+}
+
+std::string FirstFault(const LibraryKind& kind, const LibraryEntry& entry) {
+  std::vector<LibraryFinding> findings;
+  CheckRows(kind, entry, 0, findings);
+  return findings.empty() ? std::string() : findings.front().text;
 }
 
 std::vector<LibraryFinding> FindingsOf(const Library& library) {

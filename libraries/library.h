@@ -142,6 +142,8 @@ void ChooseModel(const LibraryModel& model, LibraryText& text);
 
 /// What is wrong with a number of a row: "LAI is 21, a number from 0 to 20 was expected". Empty when nothing is.
 std::string WhyWrong(const LibraryColumn& column, double value);
+/// The first thing that is wrong with an entry, of whatever name; empty when nothing is.
+std::string FirstFault(const LibraryKind& kind, const LibraryEntry& entry);
 /// All that is wrong, in the order of the file.
 std::vector<LibraryFinding> FindingsOf(const Library& library);
 /// "crops.etv:12: Vegetation \"Maize\", stage 3: LAI is 25, ...", for the command line and logs.

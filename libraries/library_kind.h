@@ -24,8 +24,9 @@ struct LibraryColumn {
   bool isWhole = false;
   double least = 0;
   double most = std::numeric_limits<double>::max();
-  double initial = 0;         ///< Of a new entry.
-  std::string_view key = {};  ///< In the file, of rows that stand in sections.
+  double initial = 0;           ///< Of a new entry.
+  std::string_view key = {};    ///< In the file, of rows that stand in sections.
+  bool isLeastOutside = false;  ///< Numbers are above `least`, which is none of them.
 };
 
 /// What a field's numbers are: the parameters of a model, which the file names in front of them, or numbers alone.
@@ -59,6 +60,8 @@ struct LibraryKind {
   std::string_view countKey = {};     ///< Of the number of entries there; empty where none is told.
   std::string_view rowCountKey = {};  ///< Of the number of rows of an entry.
   LibraryField rowFile = {};          ///< A data file and an item of it, of rows that stand in sections.
+  /// What is wrong with fields whose numbers are sound one by one; null where nothing more can be.
+  std::string (*whyWrongFields)(const LibraryEntry& entry) = nullptr;
   /// What is wrong with a row beside its own numbers; null where nothing more can be.
   std::string (*whyWrongRow)(const LibraryEntry& entry, const LibraryRow& row) = nullptr;
 

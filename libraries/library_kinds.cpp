@@ -4,6 +4,7 @@
 
 #include <algorithm>
 
+#include "libraries/soils.h"
 #include "libraries/vegetations.h"
 #include "libraries/wells.h"
 #include "platform/text.h"
@@ -12,7 +13,7 @@ namespace tervane {
 
 namespace {
 
-constexpr const LibraryKind* kKinds[] = {&kVegetationLibrary, &kWellLibrary};
+constexpr const LibraryKind* kKinds[] = {&kVegetationLibrary, &kSoilLibrary, &kWellLibrary};
 
 }  // namespace
 

@@ -28,30 +28,6 @@ std::string Capital(std::string_view word) {
 
 }  // namespace
 
-SeriesContent ChartOf(const LibraryKind& kind, const LibraryEntry& entry) {
-  SeriesContent chart;
-  chart.numbers = {fmt::format("{}. {}", kind.columns[0].head, kind.between), std::string(kind.columns[0].unit), false};
-  if (entry.rows.size() < 2) {
-    chart.message = fmt::format("Two {} make a curve.", kind.rowNames);
-    return chart;
-  }
-  std::vector<const LibraryRow*> rows;
-  for (const LibraryRow& row : entry.rows) rows.push_back(&row);
-  std::ranges::stable_sort(rows, {}, [](const LibraryRow* row) { return row->values[0]; });
-  for (std::size_t column = 1; column < kind.columns.size(); ++column) {
-    Series series;
-    series.name = kind.columns[column].head;
-    series.unit = kind.columns[column].unit;
-    series.panel = static_cast<int>(column) - 1;
-    for (const LibraryRow* row : rows) {
-      series.positions.push_back(row->values[0]);
-      series.values.push_back(row->values[column]);
-    }
-    chart.series.push_back(std::move(series));
-  }
-  return chart;
-}
-
 /// Stands for the library where pages speak of a node: it bears the findings.
 class LibraryEditor::Node : public CTvnKvfBase {
  public:
@@ -110,6 +86,7 @@ class LibraryEditor::Page : public CYbSEDlgBase {
     const LibraryKind& kind = editor_.Kind();
     const Condition hasEntry =
         Sentence(fmt::format("the library has a {}", kind.entryName), [this] { return Entry() != nullptr; });
+    const LibraryView* view = ViewOf(kind);
     for (std::size_t i = 0; i < kind.fields.size(); ++i) {
       if (!kind.fields[i].models.empty()) {
         DescribeNumbers(form, i, hasEntry);
@@ -125,15 +102,14 @@ class LibraryEditor::Page : public CYbSEDlgBase {
           .EnabledWhen(hasEntry);
     }
     if (kind.HasRows()) DescribeRows(form, hasEntry);
-    const LibraryView* view = ViewOf(kind);
-    if (view && view->describe) view->describe(form, *this);
+    if (view && view->describe) view->describe(form, *this, [this] { return Entry(); });
     if (view && view->map)
       form.Map([this, view] { return view->map(editor_.Content(), editor_.Current()); }).ShownWhen(hasEntry);
-    form.Chart([this, view] {
+    form.Chart([this] {
       SeriesContent none;
       none.message = fmt::format("The library has no {}.", editor_.Kind().entryNames);
       if (!Entry()) return none;
-      return view && view->chart ? view->chart(editor_.Content(), *Entry()) : ChartOf(editor_.Kind(), *Entry());
+      return ChartOf(editor_.Content(), *Entry());
     });
   }
 

@@ -17,9 +17,6 @@
 
 namespace tervane {
 
-/// The columns of an entry over its first one.
-SeriesContent ChartOf(const LibraryKind& kind, const LibraryEntry& entry);
-
 class LibraryEditor {
  public:
   LibraryEditor(const LibraryKind& kind, std::string path);

@@ -17,11 +17,13 @@ struct LibraryView {
   const LibraryKind* kind;
   SeriesContent (*chart)(const Library& library, const LibraryEntry& entry) = nullptr;
   MapContent (*map)(const Library& library, std::size_t current) = nullptr;
-  /// Further controls below the values.
-  void (*describe)(PageForm& form, CYbSEDlgBase& page) = nullptr;
+  /// Further controls below the texts. `current` gives the entry that is shown, null for none.
+  void (*describe)(PageForm& form, CYbSEDlgBase& page, std::function<LibraryEntry*()> current) = nullptr;
 };
 
 /// The view of a kind; null for one that has none of its own.
 const LibraryView* ViewOf(const LibraryKind& kind);
+/// The chart of an entry, by the view of its kind or over its rows.
+SeriesContent ChartOf(const Library& library, const LibraryEntry& entry);
 
 }  // namespace tervane

@@ -13,7 +13,7 @@
 #include <QSplitter>
 #include <QVBoxLayout>
 
-#include "pages/library_editor.h"
+#include "pages/library_views.h"
 #include "shell/charts/series_plot.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/row_delegate.h"
@@ -110,7 +110,7 @@ void LibraryDialog::ShowEntry() {
   const int row = list_->currentRow();
   const bool isEntry = reading_ && row >= 0 && row < static_cast<int>(reading_->library.entries.size());
   chart_->ShowWhenThere([this, row, isEntry] {
-    if (isEntry) return ChartOf(question_.kind, reading_->library.entries[static_cast<std::size_t>(row)]);
+    if (isEntry) return ChartOf(reading_->library, reading_->library.entries[static_cast<std::size_t>(row)]);
     SeriesContent none;
     none.message = FromQt(tr("No %1 is chosen.").arg(ToQt(std::string(question_.kind.entryName))));
     return none;

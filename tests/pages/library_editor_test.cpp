@@ -4,7 +4,9 @@
 
 #include <gmock/gmock.h>
 
+#include "libraries/soils.h"
 #include "libraries/vegetations.h"
+#include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane {
@@ -75,6 +77,39 @@ TEST_F(EditedLibrary, ADeletedEntryLeavesWhatIsNotItsOwnAndComesBackWhole) {
   while (!editor_.Content().entries.empty()) editor_.Delete();
   EXPECT_THAT(FormText(page_->Form()), HasSubstr("The library has no vegetations."));
   EXPECT_EQ(page_->Enter(Name(), "x"), "this value cannot be changed here");
+}
+
+TEST(EditedSoils, ATextureIsOneStepAndModelsShowTheirOwnNumbers) {
+  const test::TempFolder folder;
+  LibraryEditor editor(kSoilLibrary, folder.Write("a.uzs", "target TERVANE_SOILS {\n}\n"));
+  test::ScriptedHost host;
+  const auto page = editor.MakePage(
+      host, [] {}, [] {});
+  const auto find = [&](std::string_view label) -> Control& {
+    for (const auto& control : page->Form().Controls())
+      if (control->label == label) return *control;
+    throw std::runtime_error("no " + std::string(label));
+  };
+  editor.Add();
+  host.Expect("Texture", std::optional(3));
+  page->Press(find("Set from Texture"));
+  EXPECT_EQ(host.Items().rows[3].cells.front(), "Loam");
+  EXPECT_EQ(editor.UndoName(), "Set from Texture");
+  EXPECT_FALSE(editor.HasFindings());
+  EXPECT_EQ(find("Alpha:").Text(), "3.6");
+  EXPECT_THAT(FormText(page->Form()), HasSubstr("2 series, 242 values, in 2 charts, over Suction"));
+  EXPECT_EQ(page->Enter(find("n:"), "1"), "n is 1, a number above 1 and up to 20 was expected");
+  // Another model has other numbers.
+  EXPECT_EQ(page->Enter(find("Retention:"), "2"), "");
+  EXPECT_FALSE(find("Alpha:").IsShown());
+  EXPECT_TRUE(find("b:").IsShown());
+  EXPECT_FALSE(editor.HasFindings());
+  editor.Undo();
+  editor.Undo();
+  EXPECT_EQ(find("Source:").Text(), "");
+  host.Expect("Texture", std::optional<int>());
+  page->Press(find("Set from Texture"));
+  EXPECT_EQ(editor.UndoName(), "Add Soil");
 }
 
 }  // namespace
