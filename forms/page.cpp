@@ -46,6 +46,8 @@ std::string ActionName(std::string_view label) {
 std::string CYbSEDlgBase::Enter(Control& control, const std::string& typed) {
   if (!control.enter || !control.IsEnabled()) return "this value cannot be changed here";
   if (control.Text() == typed) return {};
+  for (const auto& [value, rule] : control.optionRules)
+    if (std::to_string(value) == typed && !rule.Holds(*control.pageNode)) return "this option cannot be chosen here";
   if (std::string expected = control.enter(typed); !expected.empty()) return expected;
   CommitValue(control);
   return {};

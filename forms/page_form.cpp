@@ -18,10 +18,10 @@
 namespace tervane {
 
 std::string_view NameOf(ControlKind kind) {
-  constexpr std::array<std::string_view, 23> names{"check",  "radio",  "choice",  "text",      "long text", "integer",
+  constexpr std::array<std::string_view, 24> names{"check",  "radio",  "choice",  "text",      "long text", "integer",
                                                    "number", "date",   "file",    "label",     "button",    "table",
                                                    "shown",  "notice", "view",    "text file", "browser",   "report",
-                                                   "map",    "chart",  "section", "group",     "sub-form"};
+                                                   "map",    "chart",  "section", "depths",    "group",     "sub-form"};
   return names[static_cast<std::size_t>(kind)];
 }
 
@@ -35,6 +35,13 @@ int Control::Option() const {
     return found == optionValues.end() ? -1 : static_cast<int>(found - optionValues.begin());
   }
   return number >= 0 && number < static_cast<int>(Options().size()) ? number : -1;
+}
+
+bool Control::IsOptionEnabled(int option) const {
+  const std::string value = OptionValue(option);
+  return std::ranges::all_of(optionRules, [&](const auto& rule) {
+    return std::to_string(rule.first) != value || rule.second.Holds(*pageNode);
+  });
 }
 
 std::string Control::OptionValue(int option) const {
@@ -301,6 +308,12 @@ Control& PageForm::Section(std::function<SectionContent()> content) {
   return control;
 }
 
+Control& PageForm::Depths(std::function<DepthContent()> content) {
+  Control& control = Add(ControlKind::Depths, {});
+  control.depths = std::move(content);
+  return control;
+}
+
 PageForm& PageForm::Group(std::string title, Condition shownWhen) {
   Control& control = Add(ControlKind::Group, std::move(title));
   control.group = std::make_shared<PageForm>(node_, keys_);
@@ -350,6 +363,8 @@ std::string SummaryOf(const Control& control) {
       return Summary(Finished(control.chart));
     case ControlKind::Section:
       return Summary(Finished(control.section));
+    case ControlKind::Depths:
+      return Summary(control.depths());
     case ControlKind::Report:
       return Summary(ReadReport(control.Text()));
     default:
@@ -365,17 +380,20 @@ std::string ShownValue(const Control& control) {
       return control.Text() == "1" ? " on" : " off";
     case ControlKind::Radio:
     case ControlKind::Choice: {
-      const std::vector<std::string> options = control.Options();
+      std::vector<std::string> options = control.Options();
       const int chosen = control.Option();
       // A list without options has nothing to choose.
       std::string shown = options.empty() ? std::string()
                           : chosen >= 0   ? options[static_cast<std::size_t>(chosen)]
                                           : control.Text() + " (not in the list)";
+      for (std::size_t i = 0; i < options.size(); ++i)
+        if (!control.IsOptionEnabled(static_cast<int>(i))) options[i] += " (disabled)";
       return Replaced(fmt::format(" = {} of [{}]", shown, fmt::join(options, " | ")), "\n", " ");
     }
     case ControlKind::Map:
     case ControlKind::Chart:
     case ControlKind::Section:
+    case ControlKind::Depths:
     case ControlKind::Report:
       return " = " + Replaced(SummaryOf(control), "\n", "\\n");
     case ControlKind::Label:

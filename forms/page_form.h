@@ -26,6 +26,7 @@ class CData2DShpFile;
 class DataFileNode;
 class PageForm;
 class TableForm;
+struct DepthContent;
 struct MapContent;
 struct SectionContent;
 struct SeriesContent;
@@ -63,12 +64,14 @@ enum class ControlKind {
   Map,       ///< Grids, shapes and points from above.
   Chart,     ///< Curves over time.
   Section,   ///< A cut through the ground along a line of a map.
+  Depths,    ///< Columns of the ground over depth.
   Group,     ///< A frame with a title around further controls.
   SubForms,  ///< A place at which one of several forms stands.
 };
-/// A map, chart or section, which stands beside the form.
+/// A map, chart, section or columns, which stands beside the form.
 constexpr bool IsPlot(ControlKind kind) {
-  return kind == ControlKind::Map || kind == ControlKind::Chart || kind == ControlKind::Section;
+  return kind == ControlKind::Map || kind == ControlKind::Chart || kind == ControlKind::Section ||
+         kind == ControlKind::Depths;
 }
 
 /// A condition of a page, over what it knows.
@@ -117,7 +120,10 @@ class Control {
   std::function<MapContent()> map;       ///< What a map shows now.
   std::function<SeriesContent()> chart;  ///< What a chart shows now.
   std::function<SectionContent()> section;
+  std::function<DepthContent()> depths;
+  std::vector<std::pair<int, Condition>> optionRules;  ///< Of options by their value: when one may be chosen.
 
+  bool IsOptionEnabled(int option) const;
   bool IsEnabled() const { return enabledWhen.Holds(*pageNode); }
   bool IsShown() const { return shownWhen.Holds(*pageNode); }
   std::string Text() const { return text ? text() : std::string(); }
@@ -142,6 +148,10 @@ class Control {
   }
   Control& ShownWhen(std::string sentence, std::function<bool()> rule) {
     return ShownWhen(Sentence(std::move(sentence), std::move(rule)));
+  }
+  /// The option of that value may be chosen only then.
+  Control& OptionEnabledWhen(int value, Condition rule) {
+    return optionRules.emplace_back(value, std::move(rule)), *this;
   }
   Control& Unit(std::string text_) { return unit = std::move(text_), *this; }
   /// The node stores the base unit of that item type; the number is shown and typed in the user's unit.
@@ -224,6 +234,8 @@ class PageForm {
   Control& Chart(std::function<SeriesContent()> content);
   /// The same for a section.
   Control& Section(std::function<SectionContent()> content);
+  /// Columns over depth, asked for in the same way.
+  Control& Depths(std::function<DepthContent()> content);
   /// A frame with a title; the controls are added to the form that it holds.
   PageForm& Group(std::string title, Condition shownWhen = {});
   /// The same, in one row with the group before it.

@@ -136,4 +136,23 @@ std::string Summary(const SeriesContent& content) {
   return text;
 }
 
+double DepthContent::Bottom() const {
+  double bottom = 0;
+  for (const DepthColumn& column : columns) bottom = std::max(bottom, column.Bottom());
+  return bottom;
+}
+
+std::string Summary(const DepthContent& content) {
+  if (!content.message.empty()) return content.message;
+  std::string text;
+  for (const DepthColumn& column : content.columns) {
+    text += fmt::format("{}{}: ", text.empty() ? "" : "; ", column.title);
+    for (std::size_t i = 0; i < column.blocks.size(); ++i) {
+      const DepthBlock& block = column.blocks[i];
+      text += fmt::format("{}{} to {:.6g} m", i > 0 ? ", " : "", block.name, block.bottom);
+    }
+  }
+  return text;
+}
+
 }  // namespace tervane

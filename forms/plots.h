@@ -218,6 +218,31 @@ struct SectionContent {
   bool IsEmpty() const { return line.size() < 2 || !ground || surfaces.empty(); }
 };
 
+/// A stretch of a depth column, from the end of the one above it.
+struct DepthBlock {
+  std::string name;
+  double bottom = 0;  ///< In metres below the ground.
+  int parts = 1;      ///< Of equal height, into which it is divided.
+
+  bool operator==(const DepthBlock&) const = default;
+};
+struct DepthColumn {
+  std::string title;
+  std::vector<DepthBlock> blocks;  ///< From the ground down. Blocks of one name have one colour.
+
+  double Bottom() const { return blocks.empty() ? 0 : blocks.back().bottom; }
+  bool operator==(const DepthColumn&) const = default;
+};
+
+/// Columns beside each other over one axis of depth.
+struct DepthContent {
+  std::vector<DepthColumn> columns;
+  std::string message;  ///< Shown in the place of columns that have nothing to show.
+
+  double Bottom() const;
+  bool operator==(const DepthContent&) const = default;
+};
+
 /// One curve of a chart.
 struct Series {
   std::string name;
@@ -335,5 +360,6 @@ bool LooksSame(const SectionContent& a, const SectionContent& b);
 std::string Summary(const MapContent& content);
 std::string Summary(const SeriesContent& content);
 std::string Summary(const SectionContent& content);
+std::string Summary(const DepthContent& content);
 
 }  // namespace tervane

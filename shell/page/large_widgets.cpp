@@ -3,6 +3,7 @@
 #include <QHBoxLayout>
 
 #include "forms/plots.h"
+#include "shell/charts/depth_columns.h"
 #include "shell/charts/section_view.h"
 #include "shell/charts/series_plot.h"
 #include "shell/maps/map_canvas.h"
@@ -106,6 +107,24 @@ class SectionWidget : public ControlWidget {
   SectionView* view_;
 };
 
+class DepthsWidget : public ControlWidget {
+ public:
+  DepthsWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+    MakeLabel();
+    view_ = new DepthColumns;
+    MakeField(view_, true);
+  }
+  bool GrowsDown() const override { return true; }
+  bool GrowsRight() const override { return true; }
+  QWidget* FocusTarget() const override { return view_; }
+
+ protected:
+  void SyncValue() override { view_->Show(Described().depths(), Described().displayUnits); }
+
+ private:
+  DepthColumns* view_;
+};
+
 }  // namespace
 
 std::unique_ptr<ControlWidget> MakeLargeWidget(CYbSEDlgBase& page, Control& control) {
@@ -118,6 +137,8 @@ std::unique_ptr<ControlWidget> MakeLargeWidget(CYbSEDlgBase& page, Control& cont
       return std::make_unique<ChartWidget>(page, control);
     case ControlKind::Section:
       return std::make_unique<SectionWidget>(page, control);
+    case ControlKind::Depths:
+      return std::make_unique<DepthsWidget>(page, control);
     default:
       return nullptr;
   }

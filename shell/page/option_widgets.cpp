@@ -114,7 +114,10 @@ class RadioWidget : public ControlWidget {
   void SyncValue() override {
     const int chosen = Described().Option();
     group_->setExclusive(chosen >= 0);
-    for (QAbstractButton* button : group_->buttons()) button->setChecked(group_->id(button) == chosen);
+    for (QAbstractButton* button : group_->buttons()) {
+      button->setChecked(group_->id(button) == chosen);
+      button->parentWidget()->setEnabled(Described().IsOptionEnabled(group_->id(button)));
+    }
     group_->setExclusive(true);
     SetRemark(chosen >= 0 ? QString() : tr("The setup holds %1: choose one.").arg(NotInTheList(Described())));
   }
