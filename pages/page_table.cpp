@@ -18,6 +18,7 @@
 #include "pages/subsurface/outer_boundary_pages.h"
 #include "pages/subsurface/reservoir_pages.h"
 #include "pages/subsurface/saturated_zone_pages.h"
+#include "pages/subsurface/soil_pages.h"
 #include "pages/subsurface/unsaturated_zone_pages.h"
 #include "pages/subsurface/well_pages.h"
 #include "pages/surface/climate_pages.h"
@@ -54,6 +55,7 @@ constexpr PageFile kFiles[] = {
     {"surface", IrrigationPages},
     {"surface", RiverPages},
     {"subsurface", UnsaturatedZonePages},
+    {"subsurface", SoilPages},
     {"subsurface", SaturatedZonePages},
     {"subsurface", GeologyPages},
     {"subsurface", ComputationalLayerPages},

@@ -39,7 +39,8 @@ void ZoneSource::ExchangeCount(KeyExchange& keys) {
 void ZoneSource::ReadCount(KvfNode* section, const KvfNode* zones) {
   if (!HasZones()) return;
   int count = 0;
-  if (kvfGetParam(section, kind_.countKey, &count, 1, 1)) count = CountToTake(section, kind_.countKey, count, zones);
+  if (!kvfGetParam(section, kind_.countKey, &count, 1, 1)) return;
+  count = CountToTake(section, kind_.countKey, count, zones);
   // An old file may hold the zones in two places: what is read later counts.
   for (CFMSEKvfGroupBase* zone : ZoneItems(owner_)) owner_.RemoveChild(zone);
   for (int number = 1; number <= count; ++number) owner_.AddChild(owner_.CreateStationItem());
@@ -104,7 +105,8 @@ int CodedZoneProp::ValidateData() {
   const ZoneSource* source = AreaSource();
   if (!source) return 1;
   const std::string id = source->UsesGridCodes() ? std::to_string(StationCode()) : GRIDCODEID;
-  if (source->HasNoCell(id)) AddWarning("It gets no cell of the model: what it holds is used nowhere", "GRIDCODEID");
+  if (source->HasNoCell(id))
+    AddWarning("It gets no cell of the model: what it holds is used nowhere", std::string(KeyOf(ZonePart::Id)));
   return 1;
 }
 
@@ -112,7 +114,7 @@ void CodedZoneProp::ExchangeKeys(KeyExchange& keys) {
   for (const auto& [part, key] : zoneKeys_) {
     switch (part) {
       case ZonePart::Number:
-        keys(key, ProfileSecNumber);
+        keys.WriteOnly(key, ProfileSecNumber);
         break;
       case ZonePart::Id:
         keys(key, GRIDCODEID);

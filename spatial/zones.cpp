@@ -62,10 +62,14 @@ void CodedZonesKvf::ReadData(KvfNode* section) {
 }
 
 void CodedZonesKvf::WriteData(KvfFile* file) {
+  NumberZones();
+  CFMSEKvfBase::WriteData(file);
+}
+
+void CodedZonesKvf::NumberZones() {
   int number = 0;
   for (CFMSEKvfGroupBase* zone : ZoneItems(*this))
     if (auto* coded = dynamic_cast<CodedZoneProp*>(zone)) coded->ProfileSecNumber = ++number;
-  CFMSEKvfBase::WriteData(file);
 }
 
 // ---- Subcatchments

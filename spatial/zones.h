@@ -81,8 +81,15 @@ class CodedZonesKvf : public CFMSEKvfBase, public ZoneSource {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+  /// For the constructor of a class whose new nodes have the zones of their source.
+  void BeginWithZones() {
+    SyncZones();
+    NumberZones();
+  }
 
  private:
+  void NumberZones();
+
   const CodedZonesKind& kind_;
 };
 

@@ -8,7 +8,7 @@
 
 namespace tervane {
 
-/// The page of the unsaturated zone.
+/// The pages of the unsaturated zone, but those of its soils.
 std::span<const PageRow> UnsaturatedZonePages();
 
 }  // namespace tervane

@@ -129,7 +129,7 @@ bool IsDerived(const std::string& key) {
                               "ExtraParams:NoOfParams", ":NO_", "NumberOfSources", "Riverlinks:Noofreaches",
                               "NO_TIMESERIES", "ITEM_COUNT", ":NumberOf", ":NoInternal",
                               // Of the zone's identity and place.
-                              ":GRIDCODE", "ProfileSecNumber", ":AreaCode", ":DemandCode",
+                              ":GRIDCODE", "ProfileSecNumber", ":SoilSecNumber", ":AreaCode", ":DemandCode",
                               // Of other keys of the source.
                               ":RS_6", ":RS_7", "Source1:TYPE",
                               // A kind of value that the file's value has not.
