@@ -55,8 +55,8 @@ enum ConductivityModel : std::size_t { kMualemModel, kPowerLawModel };
 constexpr LibraryModel kConductivities[] = {{"Mualem", kMualem}, {"Power law", kPowerLaw}};
 constexpr LibraryModel kDensities[] = {{"", kDensity}};
 
-enum Field { kName, kSource, kRetention, kConductivity, kBulkDensity };
-constexpr LibraryField kFields[] = {
+enum SoilField { kSoilName, kSoilSource, kRetentionField, kConductivityField, kBulkDensityField };
+constexpr LibraryField kSoilFields[] = {
     {"Name", "Name:", "The name by which setups know the soil"},
     {"Source", "Source:", "Where the values come from"},
     {"Retention", "Retention:", "The model of how much water the soil holds at a suction", kRetentions},
@@ -66,14 +66,14 @@ constexpr LibraryField kFields[] = {
 };
 
 std::string WhyWrongContents(const LibraryEntry& entry) {
-  if (entry.fields[kRetention].text == kRetentions[kCampbellModel].name) return {};
-  const double thetaS = entry.Number(kRetention, 0), thetaR = entry.Number(kRetention, 1);
+  if (entry.fields[kRetentionField].text == kRetentions[kCampbellModel].name) return {};
+  const double thetaS = entry.Number(kRetentionField, 0), thetaR = entry.Number(kRetentionField, 1);
   if (thetaR < thetaS) return {};
   return fmt::format("{} is {}, less than the saturated {} was expected", kThetaR.head, ShortestNumber(thetaR),
                      ShortestNumber(thetaS));
 }
 
-constexpr SoilTexture kTextures[] = {
+constexpr SoilTexture kSoilTextures[] = {
     {"Sand", 0.045, 0.43, 0.145, 2.68, 29.70},
     {"Loamy sand", 0.057, 0.41, 0.124, 2.28, 14.59},
     {"Sandy loam", 0.065, 0.41, 0.075, 1.89, 4.42},
@@ -89,7 +89,7 @@ constexpr SoilTexture kTextures[] = {
 };
 
 /// As people write it: four digits.
-double Rounded(double value) { return std::strtod(fmt::format("{:.4g}", value).c_str(), nullptr); }
+double RoundedToFour(double value) { return std::strtod(fmt::format("{:.4g}", value).c_str(), nullptr); }
 
 }  // namespace
 
@@ -103,16 +103,16 @@ constexpr LibraryKind kSoilLibrary{
     .filter = "UZ Soil property file (*.uzs)|*.uzs||",
     .target = "TERVANE_SOILS",
     .sectionPattern = "Soil_%d",
-    .fields = kFields,
+    .fields = kSoilFields,
     .whyWrongFields = WhyWrongContents,
 };
 
 std::optional<Soil> SoilOf(const LibraryEntry& entry) {
   if (!FirstFault(kSoilLibrary, entry).empty()) return std::nullopt;
   Soil soil;
-  const auto retention = [&](std::size_t parameter) { return entry.Number(kRetention, parameter); };
+  const auto retention = [&](std::size_t parameter) { return entry.Number(kRetentionField, parameter); };
   soil.thetaS = retention(0);
-  const std::string& model = entry.fields[kRetention].text;
+  const std::string& model = entry.fields[kRetentionField].text;
   if (model == kRetentions[kVanGenuchtenModel].name) {
     soil.thetaR = retention(1);
     soil.alpha = retention(2);
@@ -127,9 +127,9 @@ std::optional<Soil> SoilOf(const LibraryEntry& entry) {
     soil.airEntry = retention(1);
     soil.lambda = 1 / retention(2);
   }
-  soil.ks = entry.Number(kConductivity, 0);
-  const double second = entry.Number(kConductivity, 1);
-  if (entry.fields[kConductivity].text == kConductivities[kMualemModel].name) {
+  soil.ks = entry.Number(kConductivityField, 0);
+  const double second = entry.Number(kConductivityField, 1);
+  if (entry.fields[kConductivityField].text == kConductivities[kMualemModel].name) {
     soil.poreConnectivity = second;
   } else {
     soil.conductivity = Soil::Conductivity::PowerLaw;
@@ -187,23 +187,23 @@ std::string FaultOfSoil(const std::string& path, std::string_view soil) {
 
 // ---- Texture classes
 
-std::span<const SoilTexture> SoilTextures() { return kTextures; }
+std::span<const SoilTexture> SoilTextures() { return kSoilTextures; }
 
 void SetFromTexture(LibraryEntry& soil, const SoilTexture& texture) {
   constexpr double kPerCentimetre = 100;              // in 1/m
   constexpr double kCentimetrePerHour = 0.01 / 3600;  // in m/s
   constexpr double kDensityOfQuartz = 2650;           // in kg/m^3
-  soil.fields[kSource].text = fmt::format("Carsel and Parrish (1988), {}", LowerCase(texture.name));
-  const auto set = [&soil](Field field, std::string_view model, std::vector<KeyNumber<double>> numbers) {
+  soil.fields[kSoilSource].text = fmt::format("Carsel and Parrish (1988), {}", LowerCase(texture.name));
+  const auto set = [&soil](SoilField field, std::string_view model, std::vector<KeyNumber<double>> numbers) {
     soil.fields[field].text = model;
     soil.fields[field].numbers = std::move(numbers);
     // What stood behind the numbers of another model says nothing here.
     soil.fields[field].more.clear();
   };
-  set(kRetention, kRetentions[kVanGenuchtenModel].name,
-      {texture.thetaS, texture.thetaR, Rounded(texture.alpha * kPerCentimetre), texture.n});
-  set(kConductivity, kConductivities[kMualemModel].name, {Rounded(texture.ks * kCentimetrePerHour), 0.5});
-  set(kBulkDensity, {}, {Rounded((1 - texture.thetaS) * kDensityOfQuartz)});
+  set(kRetentionField, kRetentions[kVanGenuchtenModel].name,
+      {texture.thetaS, texture.thetaR, RoundedToFour(texture.alpha * kPerCentimetre), texture.n});
+  set(kConductivityField, kConductivities[kMualemModel].name, {RoundedToFour(texture.ks * kCentimetrePerHour), 0.5});
+  set(kBulkDensityField, {}, {RoundedToFour((1 - texture.thetaS) * kDensityOfQuartz)});
 }
 
 }  // namespace tervane

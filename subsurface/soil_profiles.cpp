@@ -17,10 +17,10 @@ namespace tervane {
 
 namespace {
 
-constexpr ZoneKey kProfileKeys[] = {
+constexpr ZoneKey kSoilProfileKeys[] = {
     {ZonePart::Number, "ProfileSecNumber"}, {ZonePart::Id, "GridCode"}, {ZonePart::Name, "SoilProfile_ID"}};
 
-constexpr CodedZonesKind kProfiles{
+constexpr CodedZonesKind kSoilProfileZones{
     .className = "CUZSoilProfileKvf",
     .title = "Soil Profile Definitions",
     .section = "UZSoilProfiles",
@@ -101,7 +101,7 @@ void BypassConstants::Exchange(KeyExchange& keys) {
 }
 
 CUZSoilProfilePropKvf::CUZSoilProfilePropKvf(CYbSEKvfBase* parent)
-    : CodedZoneProp(kProfileKeys, "UZ Soil Profile Definition", "UZSoilProfileProp", parent),
+    : CodedZoneProp(kSoilProfileKeys, "UZ Soil Profile Definition", "UZSoilProfileProp", parent),
       BypassConstants{.BYP = 0.25f, .THR1 = 0.15f, .THR2 = 0.05f},
       soils_(NewChild<CUZSoilProfilePropLayerListKvf>()),
       cells_(NewChild<CUZSoilProfilePropDiscrListKvf>()) {
@@ -127,7 +127,7 @@ int CUZSoilProfilePropKvf::ValidateData() {
   return isValid;
 }
 
-CUZSoilProfileKvf::CUZSoilProfileKvf(CYbSEKvfBase* parent) : CodedZonesKvf(kProfiles, parent) {
+CUZSoilProfileKvf::CUZSoilProfileKvf(CYbSEKvfBase* parent) : CodedZonesKvf(kSoilProfileZones, parent) {
   TakesPartWhen(Component(&CModelCompKvf::UZ) && SoilColumnsComputed());
   BeginWithZones();
 }

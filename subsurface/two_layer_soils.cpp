@@ -14,21 +14,21 @@ namespace tervane {
 
 namespace {
 
-constexpr ZoneKey kSoilKeys[] = {
+constexpr ZoneKey kTwoLayerSoilKeys[] = {
     {ZonePart::Number, "SoilSecNumber"}, {ZonePart::Id, "GridCode"}, {ZonePart::Name, "Soil_ID"}};
 
-constexpr CodedZonesKind kSoils{.className = "CUZWetlandSoilProfileKvf",
-                                .title = "2-Layer UZ Soil",
-                                .section = "TwoLayerUZSoilProperties",
-                                .source = {.countKey = "NO_SOIL_TYPES"},
-                                .distribution = CodedZonesKvf::kUniform,
-                                .makeZone = MakeZone<CUZWetlandSoilPropKvf>,
-                                .page = &kTwoLayerSoilsPage};
+constexpr CodedZonesKind kTwoLayerSoilZones{.className = "CUZWetlandSoilProfileKvf",
+                                            .title = "2-Layer UZ Soil",
+                                            .section = "TwoLayerUZSoilProperties",
+                                            .source = {.countKey = "NO_SOIL_TYPES"},
+                                            .distribution = CodedZonesKvf::kUniform,
+                                            .makeZone = MakeZone<CUZWetlandSoilPropKvf>,
+                                            .page = &kTwoLayerSoilsPage};
 
 }  // namespace
 
 CUZWetlandSoilPropKvf::CUZWetlandSoilPropKvf(CYbSEKvfBase* parent)
-    : CodedZoneProp(kSoilKeys, "2-Layer UZ Soil properties", "UZSoilProp", parent),
+    : CodedZoneProp(kTwoLayerSoilKeys, "2-Layer UZ Soil properties", "UZSoilProp", parent),
       BypassConstants{.BYP = 0.3f, .THR1 = 0.1f, .THR2 = 0.05f} {
   SetPage(kTwoLayerSoilPage);
 }
@@ -56,7 +56,7 @@ int CUZWetlandSoilPropKvf::ValidateData() {
   return isValid;
 }
 
-CUZWetlandSoilProfileKvf::CUZWetlandSoilProfileKvf(CYbSEKvfBase* parent) : CodedZonesKvf(kSoils, parent) {
+CUZWetlandSoilProfileKvf::CUZWetlandSoilProfileKvf(CYbSEKvfBase* parent) : CodedZonesKvf(kTwoLayerSoilZones, parent) {
   TakesPartWhen(Component(&CModelCompKvf::UZ) && TwoLayerMethod());
   BeginWithZones();
 }

@@ -13,36 +13,37 @@ namespace tervane {
 
 namespace {
 
-using List = CUnSatInitConditionLayerListKvf;
+using InitialList = CUnSatInitConditionLayerListKvf;
 
-constexpr KeyChoice kDistributions[] = {{List::kUniform, "Uniform"},
-                                        {List::kByLayers, "Layer based"},
-                                        {List::kFullyDistributed, "Fully distributed (.nds3)"}};
-constexpr KeyChoice kDistributionsWithoutGrid[] = {{List::kUniform, "Uniform"},
-                                                   {List::kByLayers, "Layer based"},
-                                                   {List::kFullyDistributed, "Fully distributed (.nds3)", false}};
+constexpr KeyChoice kInitialDistributions[] = {{InitialList::kUniform, "Uniform"},
+                                               {InitialList::kByLayers, "Layer based"},
+                                               {InitialList::kFullyDistributed, "Fully distributed (.nds3)"}};
+constexpr KeyChoice kInitialDistributionsWithoutGrid[] = {
+    {InitialList::kUniform, "Uniform"},
+    {InitialList::kByLayers, "Layer based"},
+    {InitialList::kFullyDistributed, "Fully distributed (.nds3)", false}};
 
 /// The sections of quantities that engines do not take as a grid.
-constexpr std::string_view kWithoutGrid[] = {"Initial_Water_Content",
-                                             "Initial_Matrix_Potential",
-                                             "Species_%d",
-                                             "Half_Life",
-                                             "Macropore_Half_Life",
-                                             "Linear_Kd",
-                                             "Freundlich_Kf",
-                                             "Freundlich_n",
-                                             "Langmuir_Alpha",
-                                             "Langmuir_Beta",
-                                             "KinSorpRate",
-                                             "KinDeSorpRate"};
+constexpr std::string_view kSectionsWithoutGrid[] = {"Initial_Water_Content",
+                                                     "Initial_Matrix_Potential",
+                                                     "Species_%d",
+                                                     "Half_Life",
+                                                     "Macropore_Half_Life",
+                                                     "Linear_Kd",
+                                                     "Freundlich_Kf",
+                                                     "Freundlich_n",
+                                                     "Langmuir_Alpha",
+                                                     "Langmuir_Beta",
+                                                     "KinSorpRate",
+                                                     "KinDeSorpRate"};
 
-const Data2DKind kLowerLevel{.className = "CData2DWQKvf",
-                             .section = "LowerLevel",
-                             .title = "Lower Level",
-                             .itemType = quantity::kElevation,
-                             .relativeToGround = Data2DKind::RelativeToGround::Off};
+const Data2DKind kInitialLowerLevel{.className = "CData2DWQKvf",
+                                    .section = "LowerLevel",
+                                    .title = "Lower Level",
+                                    .itemType = quantity::kElevation,
+                                    .relativeToGround = Data2DKind::RelativeToGround::Off};
 
-Data2DKind LayerValues(int itemType) {
+Data2DKind InitialLayerValues(int itemType) {
   return {.className = "CUnSatInitConLayerSubKvf", .section = "LayerData2DWQ", .title = {}, .itemType = itemType};
 }
 
@@ -51,7 +52,7 @@ Data2DKind LayerValues(int itemType) {
 // ---- A layer
 
 CUnSatInitConLayerSubKvf::CUnSatInitConLayerSubKvf(int itemType, CYbSEKvfBase* parent)
-    : CData2DKvf(LayerValues(itemType), parent) {}
+    : CData2DKvf(InitialLayerValues(itemType), parent) {}
 
 const std::string& CUnSatInitConLayerSubKvf::GetTitle() const {
   const CYbSEKvfBase* layer = GetParent();
@@ -60,12 +61,12 @@ const std::string& CUnSatInitConLayerSubKvf::GetTitle() const {
   return shownTitle_;
 }
 
-CUnSatInitConditionLayerItemKvf::CUnSatInitConditionLayerItemKvf(const List& list, CYbSEKvfBase* parent)
+CUnSatInitConditionLayerItemKvf::CUnSatInitConditionLayerItemKvf(const InitialList& list, CYbSEKvfBase* parent)
     : NamedItemKvf("UnSatInitConditionLayerItem", "Layer_%d", "Layer", parent) {
   SetHelp("Top.chm", "UZ_Layer.htm");
   SetPage(kHelpPage);
-  TakesPartWhen(Is(list.DistributionType, List::kByLayers));
-  NewChild<CData2DKvf>(kLowerLevel);
+  TakesPartWhen(Is(list.DistributionType, InitialList::kByLayers));
+  NewChild<CData2DKvf>(kInitialLowerLevel);
   NewChild<CUnSatInitConLayerSubKvf>(list.GetItemType());
 }
 
@@ -80,7 +81,7 @@ CUnSatInitConditionLayerListKvf::CUnSatInitConditionLayerListKvf(std::string tit
 }
 
 bool CUnSatInitConditionLayerListKvf::MayBeFullyDistributed() const {
-  return std::ranges::find(kWithoutGrid, GetSectionName()) == std::end(kWithoutGrid);
+  return std::ranges::find(kSectionsWithoutGrid, GetSectionName()) == std::end(kSectionsWithoutGrid);
 }
 
 std::unique_ptr<CUnSatInitConditionLayerItemKvf> CUnSatInitConditionLayerListKvf::NewItem() {
@@ -89,7 +90,8 @@ std::unique_ptr<CUnSatInitConditionLayerItemKvf> CUnSatInitConditionLayerListKvf
 
 void CUnSatInitConditionLayerListKvf::ExchangeKeys(KeyExchange& keys) {
   keys("DistributionType", DistributionType)
-      .OneOf(MayBeFullyDistributed() ? KeyChoices(kDistributions) : KeyChoices(kDistributionsWithoutGrid));
+      .OneOf(MayBeFullyDistributed() ? KeyChoices(kInitialDistributions)
+                                     : KeyChoices(kInitialDistributionsWithoutGrid));
   keys("Distribution_UniformValue", Distribution_UniformValue).Quantity(GetItemType());
   keys.Count("NumberOfLayers", *this);
 }

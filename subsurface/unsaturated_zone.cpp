@@ -13,43 +13,45 @@ namespace tervane {
 
 namespace {
 
-using Zone = CUnsatzoneKvf;
+using UnsaturatedZone = CUnsatzoneKvf;
 
-constexpr KeyChoice kMacroporeFlows[] = {{Zone::kNoMacropores, "None"},
-                                         {Zone::kSimpleBypass, "Simple by-pass flow"},
-                                         {Zone::kFullMacroporeFlow, "Full macropore flow (Richards and Gravity only)"}};
-constexpr KeyChoice kClassifications[] = {{Zone::kAutomatic, "1: Automatic"},
-                                          {Zone::kSpecifiedPoints, "2: Specified calculation points"},
-                                          {Zone::kAllCells, "3: Calculated in all grid points"},
-                                          {Zone::kPartialAutomatic, "4: Partial automatic (combination of 1 and 2)"}};
-constexpr KeyChoice kInitialConditions[] = {{Zone::kEquilibrium, "Equilibrium pressure profile"},
-                                            {Zone::kMatrixPotential, "Specified matrix potential"},
-                                            {Zone::kWaterContent, "Specified water content"}};
+constexpr KeyChoice kMacroporeFlows[] = {
+    {UnsaturatedZone::kNoMacropores, "None"},
+    {UnsaturatedZone::kSimpleBypass, "Simple by-pass flow"},
+    {UnsaturatedZone::kFullMacroporeFlow, "Full macropore flow (Richards and Gravity only)"}};
+constexpr KeyChoice kClassifications[] = {
+    {UnsaturatedZone::kAutomatic, "1: Automatic"},
+    {UnsaturatedZone::kSpecifiedPoints, "2: Specified calculation points"},
+    {UnsaturatedZone::kAllCells, "3: Calculated in all grid points"},
+    {UnsaturatedZone::kPartialAutomatic, "4: Partial automatic (combination of 1 and 2)"}};
+constexpr KeyChoice kUnsaturatedInitialStates[] = {{UnsaturatedZone::kEquilibrium, "Equilibrium pressure profile"},
+                                                   {UnsaturatedZone::kMatrixPotential, "Specified matrix potential"},
+                                                   {UnsaturatedZone::kWaterContent, "Specified water content"}};
 
-constexpr KeyChoice kTableOptions[] = {
+constexpr KeyChoice kClassificationTableOptions[] = {
     {CUZGroundWaterDepthListKvf::kInitialTable, "Use initial water table for classification"},
     {CUZGroundWaterDepthListKvf::kSpecifiedTable, "Specified water table for classification"}};
 
-const Data2DKind kSurfaceDepth{.className = "CUZWetlandETSurfaceDepthKvf",
-                               .section = "ETSurfaceDepth",
-                               .title = "ET Surface Depth",
-                               .itemType = quantity::kDepthBelowGround,
-                               .fixedValue = 0.1f};
-const Data2DKind kSpecified{.className = "CUZSpecifiedClassificationKvf",
-                            .section = "SpecifiedClassification",
-                            .title = "Specified Classification",
-                            .itemType = quantity::kCode};
-const Data2DKind kPartial{.className = "CUZPartialAutomationKvf",
-                          .section = "PartialAutomatic",
-                          .title = "Partial Automatic Classification",
-                          .itemType = quantity::kCode};
-const Data2DKind kGroundwaterTable{.className = "CUZGroundWaterTableKvf",
-                                   .section = "UZGroundWaterTable",
-                                   .title = "Groundwater table for UZ classification",
-                                   .itemType = quantity::kElevation,
-                                   .relativeToGround = Data2DKind::RelativeToGround::Off};
+const Data2DKind kEtSurfaceDepth{.className = "CUZWetlandETSurfaceDepthKvf",
+                                 .section = "ETSurfaceDepth",
+                                 .title = "ET Surface Depth",
+                                 .itemType = quantity::kDepthBelowGround,
+                                 .fixedValue = 0.1f};
+const Data2DKind kSpecifiedClassification{.className = "CUZSpecifiedClassificationKvf",
+                                          .section = "SpecifiedClassification",
+                                          .title = "Specified Classification",
+                                          .itemType = quantity::kCode};
+const Data2DKind kPartialClassification{.className = "CUZPartialAutomationKvf",
+                                        .section = "PartialAutomatic",
+                                        .title = "Partial Automatic Classification",
+                                        .itemType = quantity::kCode};
+const Data2DKind kClassificationTable{.className = "CUZGroundWaterTableKvf",
+                                      .section = "UZGroundWaterTable",
+                                      .title = "Groundwater table for UZ classification",
+                                      .itemType = quantity::kElevation,
+                                      .relativeToGround = Data2DKind::RelativeToGround::Off};
 
-const CUnsatzoneKvf* ZoneOf(const CYbSEKvfBase& node) { return node.Important(kUnsaturatedZone); }
+const CUnsatzoneKvf* UnsaturatedZoneOf(const CYbSEKvfBase& node) { return node.Important(kUnsaturatedZone); }
 
 }  // namespace
 
@@ -60,10 +62,10 @@ Condition SoilColumnsComputed() {
 }
 
 Condition UnsaturatedZoneIs(int CUnsatzoneKvf::*key, std::vector<int> values) {
-  return Is<CUnsatzoneKvf>(ZoneOf, key, std::move(values));
+  return Is<CUnsatzoneKvf>(UnsaturatedZoneOf, key, std::move(values));
 }
 
-Condition GreenAndAmptUsed() { return On<CUnsatzoneKvf>(ZoneOf, &CUnsatzoneKvf::USE_Green_And_Ampt); }
+Condition GreenAndAmptUsed() { return On<CUnsatzoneKvf>(UnsaturatedZoneOf, &CUnsatzoneKvf::USE_Green_And_Ampt); }
 
 CUnsatzoneKvf::CUnsatzoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Unsaturated Flow", "Unsatzone", parent) {
   SetPage(kUnsaturatedZonePage);
@@ -71,19 +73,19 @@ CUnsatzoneKvf::CUnsatzoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Unsaturated F
   TakesPartWhen(isModelled);
   NewChild<CUZSoilProfileKvf>();
   NewChild<CUZWetlandSoilProfileKvf>();
-  NewChild<CData2DKvf>(kSurfaceDepth, OwnEngine() && TwoLayerMethod());
+  NewChild<CData2DKvf>(kEtSurfaceDepth, OwnEngine() && TwoLayerMethod());
   NewChild<CUZGroundWaterDepthListKvf>()->TakesPartWhen(isModelled && !TwoLayerMethod() &&
                                                         Is(ClassificationType, {kAutomatic, kPartialAutomatic}));
   NewChild<CUnSatInitConditionsKvf>()->TakesPartWhen(isModelled && !TwoLayerMethod() &&
                                                      !Is(InitialCondition, kEquilibrium));
-  NewChild<CData2DKvf>(kSpecified, SoilColumnsComputed() && Is(ClassificationType, kSpecifiedPoints));
-  NewChild<CData2DKvf>(kPartial, SoilColumnsComputed() && Is(ClassificationType, kPartialAutomatic));
+  NewChild<CData2DKvf>(kSpecifiedClassification, SoilColumnsComputed() && Is(ClassificationType, kSpecifiedPoints));
+  NewChild<CData2DKvf>(kPartialClassification, SoilColumnsComputed() && Is(ClassificationType, kPartialAutomatic));
 }
 
 void CUnsatzoneKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Bypass", Bypass).OneOf(kMacroporeFlows);
   keys("ClassificationType", ClassificationType).OneOf(kClassifications);
-  keys("InitialCondition", InitialCondition).OneOf(kInitialConditions);
+  keys("InitialCondition", InitialCondition).OneOf(kUnsaturatedInitialStates);
   keys("Max_MP_Infiltration_Per_TimeStep", Max_MP_Infiltration_Per_TimeStep).Unit("mm");
   keys("Max_MP_Node_Exchange_Per_TimeStep", Max_MP_Node_Exchange_Per_TimeStep).Unit("mm");
   keys("Max_MP_Column_Exchange_Per_TimeStep", Max_MP_Column_Exchange_Per_TimeStep).Unit("mm");
@@ -105,13 +107,13 @@ void CUZGroundWaterDepthItemKvf::ExchangeKeys(KeyExchange& keys) {
 CUZGroundWaterDepthListKvf::CUZGroundWaterDepthListKvf(CYbSEKvfBase* parent)
     : CYbSEKvfListBase("Groundwater depths used for UZ classification", "UZGroundWaterDepthList", parent) {
   SetPage(kGroundwaterDepthsPage);
-  NewChild<CData2DKvf>(kGroundwaterTable, Is(GroundWaterTableOption, kSpecifiedTable));
+  NewChild<CData2DKvf>(kClassificationTable, Is(GroundWaterTableOption, kSpecifiedTable));
   AddItemNode();
 }
 
 void CUZGroundWaterDepthListKvf::ExchangeKeys(KeyExchange& keys) {
   keys.Count("NumberOfLayers", *this);
-  keys("GroundWaterTableOption", GroundWaterTableOption).OneOf(kTableOptions);
+  keys("GroundWaterTableOption", GroundWaterTableOption).OneOf(kClassificationTableOptions);
 }
 
 }  // namespace tervane

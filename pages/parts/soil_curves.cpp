@@ -14,7 +14,7 @@ namespace {
 // From wet to beyond the wilting point, in metres of suction.
 constexpr int kFirstDecade = -2, kLastDecade = 3, kPointsOfDecade = 24;
 
-Series Curve(const char* name, const char* unit, int panel) {
+Series SoilCurve(const char* name, const char* unit, int panel) {
   Series series;
   series.name = name;
   series.unit = unit;
@@ -46,7 +46,7 @@ SeriesContent SoilChart(const Library& /*library*/, const LibraryEntry& entry) {
     chart.message = "The values of the soil make no curves: see its findings.";
     return chart;
   }
-  Series retention = Curve("Water content", "", 0), conductivity = Curve("Conductivity", "log10(m/s)", 1);
+  Series retention = SoilCurve("Water content", "", 0), conductivity = SoilCurve("Conductivity", "log10(m/s)", 1);
   for (int i = 0; i <= (kLastDecade - kFirstDecade) * kPointsOfDecade; ++i) {
     const double suction = std::pow(10, kFirstDecade + static_cast<double>(i) / kPointsOfDecade);
     retention.positions.push_back(suction);

@@ -17,8 +17,8 @@ namespace tervane {
 
 namespace {
 
-using Layer = CUZSoilProfilePropLayerItemKvf;
-using Cells = CUZSoilProfilePropDiscrItemKvf;
+using SoilLayer = CUZSoilProfilePropLayerItemKvf;
+using SoilCells = CUZSoilProfilePropDiscrItemKvf;
 
 constexpr ZoneSourceWords kProfileWords{.gridFilter = kZoneGridFilter};
 constexpr ZoneSourceWords kTwoLayerWords{
@@ -42,9 +42,9 @@ class CUZSoilProfilePropDlg : public PageOf<CUZSoilProfilePropKvf> {
   void Describe(PageForm& form) override;
 
  private:
-  std::shared_ptr<TableOf<Layer>> SoilTable() const;
-  std::shared_ptr<TableOf<Cells>> CellTable() const;
-  void SelectSoil(Layer& layer) const;
+  std::shared_ptr<TableOf<SoilLayer>> SoilTable() const;
+  std::shared_ptr<TableOf<SoilCells>> CellTable() const;
+  void SelectSoil(SoilLayer& layer) const;
   DepthContent Depths() const;
 };
 
@@ -63,52 +63,54 @@ void CUZSoilProfilePropDlg::Describe(PageForm& form) {
   PlaceOfZone(form, n);
 }
 
-std::shared_ptr<TableOf<Layer>> CUZSoilProfilePropDlg::SoilTable() const {
+std::shared_ptr<TableOf<SoilLayer>> CUZSoilProfilePropDlg::SoilTable() const {
   CUZSoilProfilePropLayerListKvf& soils = Node().Soils();
-  auto table = std::make_shared<TableOf<Layer>>(soils);
+  auto table = std::make_shared<TableOf<SoilLayer>>(soils);
   table->ItemName("Soil");
   table
       ->Value("From depth",
-              [&soils](const Layer& layer) {
-                const Layer* above = soils.GetItem(soils.GetNumberWhatIs(&layer) - 1);
+              [&soils](const SoilLayer& layer) {
+                const SoilLayer* above = soils.GetItem(soils.GetNumberWhatIs(&layer) - 1);
                 return above ? above->Depth : 0.0f;
               })
       .Quantity(quantity::kDepthBelowGround)
       .Format("%.6g")
       .Width(85)
-      .GreyWhen([](Layer&) { return true; });
-  table->Value("To depth", &Layer::Depth).Format("%.6g").Width(80);
-  table->Value("Soil name", [](const Layer& layer) { return layer.SoilID; })
+      .GreyWhen([](SoilLayer&) { return true; });
+  table->Value("To depth", &SoilLayer::Depth).Format("%.6g").Width(80);
+  table->Value("Soil name", [](const SoilLayer& layer) { return layer.SoilID; })
       .Key("SoilID")
       .Width(120)
-      .GreyWhen([](Layer&) { return true; });
-  table->Value("UZ Soil property file", [](Layer& layer) -> FileName& { return layer.DataBase; })
+      .GreyWhen([](SoilLayer&) { return true; });
+  table->Value("UZ Soil property file", [](SoilLayer& layer) -> FileName& { return layer.DataBase; })
       .Key("DataBase")
       .Width(200)
       .Filter(std::string(kSoilLibrary.filter))
       .DefaultExtension(std::string(kSoilLibrary.extension))
-      .ToolTipOf([](Layer& layer) { return layer.DataBase.Text(); });
-  table->Button("", "...", [this](Layer& layer) { SelectSoil(layer); }).Width(25).ToolTip("Choose a soil of a library");
+      .ToolTipOf([](SoilLayer& layer) { return layer.DataBase.Text(); });
+  table->Button("", "...", [this](SoilLayer& layer) { SelectSoil(layer); })
+      .Width(25)
+      .ToolTip("Choose a soil of a library");
   table
       ->Button("", "Edit",
-               [this](Layer& layer) {
+               [this](SoilLayer& layer) {
                  if (Context().openDataFile) Context().openDataFile(layer.DataBase.Absolute());
                })
-      .EnabledWhen([](Layer& layer) { return !layer.DataBase.IsEmpty(); })
+      .EnabledWhen([](SoilLayer& layer) { return !layer.DataBase.IsEmpty(); })
       .Width(25)
       .ToolTip("Edit the library");
   return table;
 }
 
-std::shared_ptr<TableOf<Cells>> CUZSoilProfilePropDlg::CellTable() const {
+std::shared_ptr<TableOf<SoilCells>> CUZSoilProfilePropDlg::CellTable() const {
   CUZSoilProfilePropDiscrListKvf& list = Node().Cells();
-  auto table = std::make_shared<TableOf<Cells>>(list);
+  auto table = std::make_shared<TableOf<SoilCells>>(list);
   table->ItemName("Cells");
   table
       ->Running(
           "From depth", [] { return 0.0; },
-          [&list](double depth, const Cells& cells) {
-            const Cells* above = list.GetItem(list.GetNumberWhatIs(&cells) - 1);
+          [&list](double depth, const SoilCells& cells) {
+            const SoilCells* above = list.GetItem(list.GetNumberWhatIs(&cells) - 1);
             return above ? depth + above->Height() : depth;
           })
       .Quantity(quantity::kDepthBelowGround)
@@ -116,20 +118,20 @@ std::shared_ptr<TableOf<Cells>> CUZSoilProfilePropDlg::CellTable() const {
       .Width(85);
   table
       ->Running(
-          "To depth", [] { return 0.0; }, [](double depth, const Cells& cells) { return depth + cells.Height(); })
+          "To depth", [] { return 0.0; }, [](double depth, const SoilCells& cells) { return depth + cells.Height(); })
       .Quantity(quantity::kDepthBelowGround)
       .Format("%.6g")
       .Width(80);
-  table->Value("Cell height", &Cells::CellHeight).Width(90);
-  table->Value("No of cells", &Cells::NoCells).Width(80);
+  table->Value("Cell height", &SoilCells::CellHeight).Width(90);
+  table->Value("No of cells", &SoilCells::NoCells).Width(80);
   const Condition withTransport = WaterQualityComponent(&CModelCompWQKvf::UZ);
-  table->Value("Dispersivity", &Cells::Dispersivity).Width(95).ShownWhen([this, withTransport] {
+  table->Value("Dispersivity", &SoilCells::Dispersivity).Width(95).ShownWhen([this, withTransport] {
     return withTransport.Holds(Node());
   });
   return table;
 }
 
-void CUZSoilProfilePropDlg::SelectSoil(Layer& layer) const {
+void CUZSoilProfilePropDlg::SelectSoil(SoilLayer& layer) const {
   const auto choice = Outside().SelectLibraryEntry(
       {kSoilLibrary, layer.DataBase.IsEmpty() ? std::string() : layer.DataBase.Absolute(), layer.SoilID});
   if (!choice) return;
@@ -142,14 +144,14 @@ DepthContent CUZSoilProfilePropDlg::Depths() const {
   DepthContent content{{{"Soils", {}}, {"Cells", {}}}, {}};
   const CUZSoilProfilePropLayerListKvf& soils = Node().Soils();
   for (int number = 1; number <= soils.GetItemCount(); ++number) {
-    const Layer& layer = *soils.GetItem(number);
+    const SoilLayer& layer = *soils.GetItem(number);
     content.columns[0].blocks.push_back(
         {layer.SoilID.empty() ? std::string("no soil") : layer.SoilID, static_cast<double>(layer.Depth)});
   }
   const CUZSoilProfilePropDiscrListKvf& list = Node().Cells();
   double depth = 0;
   for (int number = 1; number <= list.GetItemCount(); ++number) {
-    const Cells& cells = *list.GetItem(number);
+    const SoilCells& cells = *list.GetItem(number);
     depth += cells.Height();
     content.columns[1].blocks.push_back(
         {fmt::format("{} x {}", cells.NoCells, ShortestNumber(cells.CellHeight)), depth, cells.NoCells});

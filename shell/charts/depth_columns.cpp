@@ -19,13 +19,13 @@ namespace tervane {
 
 namespace {
 
-constexpr int kMetre = 1000;
+constexpr int kStoredDepthUnit = 1000;
 /// Lines between parts stand at least so far apart, in pixels; closer ones would be a grey surface.
-constexpr double kLeastGap = 3;
-constexpr double kMostTicks = 8;
+constexpr double kLeastPartGap = 3;
+constexpr double kMostDepthTicks = 8;
 
 /// A round step that is not smaller.
-double RoundStep(double step) {
+double RoundDepthStep(double step) {
   const double power = std::pow(10, std::floor(std::log10(step)));
   for (const double factor : {1.0, 2.0, 5.0})
     if (step <= factor * power) return factor * power;
@@ -70,7 +70,7 @@ double DepthColumns::ToPixel(double depth) const {
   return frame.top() + frame.height() * depth / content_.Bottom();
 }
 
-ShownUnit DepthColumns::DepthUnit() const { return {quantity::kDepthBelowGround, kMetre, &units_}; }
+ShownUnit DepthColumns::DepthUnit() const { return {quantity::kDepthBelowGround, kStoredDepthUnit, &units_}; }
 
 QString DepthColumns::DepthText(double depth) const {
   const ShownUnit unit = DepthUnit();
@@ -121,8 +121,8 @@ void DepthColumns::PaintAxis(QPainter& painter) const {
   const QRectF frame = Frame();
   const ShownUnit unit = DepthUnit();
   const double deepest = unit.Shown(content_.Bottom());
-  const double ticks = std::clamp(frame.height() / (3.0 * fontMetrics().height()), 1.0, kMostTicks);
-  const double step = RoundStep(deepest / ticks);
+  const double ticks = std::clamp(frame.height() / (3.0 * fontMetrics().height()), 1.0, kMostDepthTicks);
+  const double step = RoundDepthStep(deepest / ticks);
   painter.setPen(palette().text().color());
   const double gap = Theme::Get().Scaled(6);
   for (int number = 0; number * step <= deepest * 1.0001; ++number) {
@@ -147,7 +147,7 @@ void DepthColumns::PaintBlock(QPainter& painter, const QRectF& place, double top
   painter.setPen(QPen(line, 1));
   painter.setBrush(LayerColor(ColorOf(block.name), isDark));
   painter.drawRect(shape);
-  if (block.parts > 1 && shape.height() / block.parts >= kLeastGap) {
+  if (block.parts > 1 && shape.height() / block.parts >= kLeastPartGap) {
     QColor faint = line;
     faint.setAlphaF(0.35f);
     painter.setPen(QPen(faint, 1));
