@@ -270,6 +270,7 @@ void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
 }
 
 void Preprocessor::ShowZones(CodedZonesKvf& zones, ReportPage& page) {
+  if (zones.Type == ZoneSource::kNone) return page.ShowText("There are no zones.");
   if (zones.DistributionType == CodedZonesKvf::kUniform) return page.ShowText("One zone for the whole area.");
   ShowZoneMap(zones, zones, page);
 }
