@@ -8,7 +8,7 @@
 
 namespace tervane {
 
-/// An item that a user names: a layer, a lens, a drain. The name is its short title.
+/// An item that a user names: a layer, a lens, a drain. The name is its title, wherever it has one.
 class NamedItemKvf : public CYbSEKvfGroupBase {
  public:
   /// `name` is what a new one is called.
@@ -17,6 +17,7 @@ class NamedItemKvf : public CYbSEKvfGroupBase {
 
   std::string Name;
 
+  const std::string& GetTitle() const override { return Name.empty() ? CYbSEKvfGroupBase::GetTitle() : Name; }
   const std::string& GetAbbreviatedTitle() const override { return Name; }
   void SetAbbreviatedTitle(std::string title) override { Name = std::move(title); }
 

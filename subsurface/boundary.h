@@ -43,6 +43,7 @@ class CGeoDataBoundCondItemKvf : public CYbSEKvfBase {
   bool HasPoint() const;
 
   /// The name, or the numbers of this segment and the next one: "2 to 3".
+  const std::string& GetTitle() const override { return GetAbbreviatedTitle(); }
   const std::string& GetAbbreviatedTitle() const override;
 
  protected:

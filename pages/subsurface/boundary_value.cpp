@@ -24,13 +24,11 @@ void DescribeWays(PageForm& form, const BoundaryValue& boundary, const BoundaryV
       .Revalidates();
 }
 
-bool HasWay(const BoundaryValue::Words& words, int way) { return way >= words.first && way <= words.last; }
-
 }  // namespace
 
 void DescribeBoundaryValue(PageForm& form, const CYbSEDlgBase& page, const BoundaryValue& boundary) {
   for (const BoundaryValue::Words& words : boundary.words) DescribeWays(form, boundary, words);
-  std::vector<int> withGrid;
+  std::vector<int> all;
   for (const BoundaryValue::Words& words : boundary.words) {
     const Condition isMeant = Is(boundary.boundary, words.boundaries);
     form.Number(words.value, boundary.value)
@@ -38,10 +36,10 @@ void DescribeBoundaryValue(PageForm& form, const CYbSEDlgBase& page, const Bound
         .ShownWhen(isMeant && Is(boundary.type, kConstant));
     DescribeSeriesFile(form, page, words.series, boundary.series, {boundary.value, {boundary.itemType()}},
                        isMeant && Is(boundary.type, kSeries));
-    if (HasWay(words, kGridSeries)) withGrid.insert(withGrid.end(), words.boundaries.begin(), words.boundaries.end());
+    all.insert(all.end(), words.boundaries.begin(), words.boundaries.end());
   }
-  // A way that goes with another kind of boundary may be left from that one.
-  const Condition byGrid = Is(boundary.type, kGridSeries) && Is(boundary.boundary, withGrid);
+  // A file may hold it for a kind of boundary that does not offer it.
+  const Condition byGrid = Is(boundary.type, kGridSeries) && Is(boundary.boundary, all);
   form.DataFile("Time varying nds2 file:", boundary.grid)
       .Filter(boundary.gridFilter)
       .DefaultExtension("nds2")
