@@ -6,6 +6,7 @@
 #pragma once
 
 #include <memory>
+#include <string>
 #include <vector>
 
 #include "geometry/grid_section.h"
@@ -25,5 +26,13 @@ struct Level {
 /// Elevations in metres at the points of a line, where the ground has those; NaN where nothing is known.
 std::vector<double> ElevationsAlong(const Level& level, const std::vector<SectionPoint>& points,
                                     const std::vector<double>& ground, GridSampling sampling = GridSampling::Bilinear);
+
+/// The centres of all cells of a grid, row by row from the south.
+std::vector<SectionPoint> CentresOf(const CTvn2DOrthoRotatedGridData& grid);
+
+/// The thickness in metres of the lowest of layers that end at those levels, the first of which begins at the ground: 0
+/// where its level lies above the one over it. On the cells of the ground, or of the first level that has some. Gives
+/// why there is none: no level differs from place to place.
+std::string ThicknessOf(const Level& ground, const std::vector<Level>& bottoms, CTvn2DOrthoRotatedGridData& thickness);
 
 }  // namespace tervane

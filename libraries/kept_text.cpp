@@ -52,6 +52,20 @@ std::string KvfTextValue(std::string_view text) {
   return KvfValueText(param);
 }
 
+bool IsKvfNumber(const KvfParam& param) {
+  return param.type == KvfType::Int || param.type == KvfType::Double || param.type == KvfType::Float;
+}
+
+bool IsNumberedName(std::string_view name, std::string_view pattern) {
+  const std::string_view prefix = pattern.substr(0, pattern.find("%d"));
+  return name.size() > prefix.size() && name.starts_with(prefix) &&
+         std::ranges::all_of(name.substr(prefix.size()), [](char c) { return c >= '0' && c <= '9'; });
+}
+
+std::string NumberedName(std::string_view pattern, std::size_t number) {
+  return fmt::format("{}{}", pattern.substr(0, pattern.find("%d")), number);
+}
+
 double KvfNumber(const KvfParam& param) {
   switch (param.type) {
     case KvfType::Int:

@@ -23,6 +23,12 @@ std::string IndentedLine(int level, std::string_view text);
 std::string IndentedLines(int level, std::string_view lines);
 /// A section or keyword as it is written.
 std::string KvfNodeText(const KvfNode& node, int level);
+/// Whether a value is a number of any form.
+bool IsKvfNumber(const KvfParam& param);
+/// Whether a name is a pattern with a number in the place of its %d, which stands at its end.
+bool IsNumberedName(std::string_view name, std::string_view pattern);
+/// The name of that number.
+std::string NumberedName(std::string_view pattern, std::size_t number);
 /// A text in quotes.
 std::string KvfTextValue(std::string_view text);
 /// A number in any of its forms, with the digits that stand in the file; NaN for none.

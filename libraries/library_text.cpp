@@ -19,13 +19,6 @@ namespace tervane {
 
 namespace {
 
-/// Whether a name is a pattern with a number in the place of its %d.
-bool IsNumbered(std::string_view name, std::string_view pattern) {
-  const std::string_view prefix = pattern.substr(0, pattern.find("%d"));
-  return name.size() > prefix.size() && name.starts_with(prefix) &&
-         std::ranges::all_of(name.substr(prefix.size()), [](char c) { return c >= '0' && c <= '9'; });
-}
-
 class LibraryReader {
  public:
   LibraryReader(const KvfFile& file, Library& library) : file_(file), library_(library), kind_(*library.kind) {}
@@ -52,7 +45,9 @@ class LibraryReader {
   }
 
  private:
-  bool IsEntry(const KvfNode& node) const { return !node.IsKeyword() && IsNumbered(node.Name(), kind_.sectionPattern); }
+  bool IsEntry(const KvfNode& node) const {
+    return !node.IsKeyword() && IsNumberedName(node.Name(), kind_.sectionPattern);
+  }
 
   void ReadTarget(const KvfSection& target) {
     if (kind_.section.empty()) return ReadEntries(target, kInTarget);
@@ -116,13 +111,10 @@ class LibraryReader {
     return true;
   }
 
-  static bool IsNumber(const KvfParam& param) {
-    return param.type == KvfType::Int || param.type == KvfType::Double || param.type == KvfType::Float;
-  }
   /// Whether a keyword has a number for each column from that value on.
   static bool HasNumbers(const KvfNode& keyword, std::uint32_t first, std::size_t count) {
     return keyword.count >= first + count &&
-           std::all_of(keyword.params + first, keyword.params + first + count, IsNumber);
+           std::all_of(keyword.params + first, keyword.params + first + count, IsKvfNumber);
   }
   static std::string NumbersExpected(std::span<const LibraryColumn> columns) {
     std::string heads;
@@ -154,7 +146,7 @@ class LibraryReader {
   }
 
   bool IsRowSection(const KvfSection& section) const {
-    return kind_.HasRowSections() && IsNumbered(section.Name(), kind_.rowKey);
+    return kind_.HasRowSections() && IsNumberedName(section.Name(), kind_.rowKey);
   }
 
   bool ReadRowSection(const KvfSection& section, LibraryEntry& entry) {
@@ -241,11 +233,6 @@ void AppendLine(std::string& text, int level, const std::string& line, const Lib
   text += '\n';
 }
 
-/// A section of that pattern and number.
-std::string SectionBegin(std::string_view pattern, std::size_t number) {
-  return fmt::format("section {}{} {{", pattern.substr(0, pattern.find("%d")), number);
-}
-
 std::string FieldValue(const LibraryField& declared, const LibraryText& field) {
   const LibraryModel* model = ModelOf(declared, field.text);
   if (!model) return KvfTextValue(field.text);
@@ -257,7 +244,7 @@ std::string FieldValue(const LibraryField& declared, const LibraryText& field) {
 
 void AppendRowSection(std::string& text, const LibraryKind& kind, const LibraryRow& row, std::size_t number,
                       int level) {
-  AppendLine(text, level, SectionBegin(kind.rowKey, number), row.context);
+  AppendLine(text, level, fmt::format("section {} {{", NumberedName(kind.rowKey, number)), row.context);
   for (std::size_t i = 0; i < kind.columns.size(); ++i)
     if (!std::isnan(row.values[i]))
       text += IndentedLine(level + 1,
@@ -273,7 +260,7 @@ void AppendRowSection(std::string& text, const LibraryKind& kind, const LibraryR
 }
 
 void AppendEntry(std::string& text, const LibraryKind& kind, const LibraryEntry& entry, std::size_t number, int level) {
-  AppendLine(text, level, SectionBegin(kind.sectionPattern, number), entry.context);
+  AppendLine(text, level, fmt::format("section {} {{", NumberedName(kind.sectionPattern, number)), entry.context);
   for (std::size_t i = 0; i < kind.fields.size(); ++i) {
     const LibraryText& field = entry.fields[i];
     if (field.isThere || !field.text.empty())

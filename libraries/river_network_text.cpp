@@ -21,18 +21,8 @@ namespace {
 
 constexpr std::string_view kTarget = "FLUVANE_Network_editor";
 constexpr std::string_view kPoints = "POINTS", kBranches = "BRANCHES", kArea = "DATA_AREA";
-constexpr std::string_view kBranchPrefix = "Branch_";
+constexpr std::string_view kBranchPattern = "Branch_%d";
 constexpr int kFormatVersion = 112;
-
-bool IsNumber(const KvfParam& param) {
-  return param.type == KvfType::Int || param.type == KvfType::Double || param.type == KvfType::Float;
-}
-
-bool IsBranch(const KvfNode& node) {
-  const std::string_view name = node.Name();
-  return !node.IsKeyword() && name.size() > kBranchPrefix.size() && name.starts_with(kBranchPrefix) &&
-         std::ranges::all_of(name.substr(kBranchPrefix.size()), [](char c) { return c >= '0' && c <= '9'; });
-}
 
 std::string Values(const KvfNode& keyword) {
   std::string text = KvfValuesText(keyword);
@@ -115,7 +105,7 @@ class RiverNetworkReader {
   bool ReadPoint(const KvfNode& node) {
     if (node.Name() != "Point") return false;
     const bool isPoint = node.IsKeyword() && node.count == 4 && node.params[0].type == KvfType::Int &&
-                         std::all_of(node.params + 1, node.params + 4, IsNumber);
+                         std::all_of(node.params + 1, node.params + 4, IsKvfNumber);
     const int line = static_cast<int>(node.line);
     if (!isPoint) {
       Refuse(line, fmt::format("Point{}: a whole number, x, y and a chainage were expected",
@@ -137,7 +127,7 @@ class RiverNetworkReader {
   }
 
   bool ReadBranch(const KvfNode& node) {
-    if (!IsBranch(node)) return false;
+    if (node.IsKeyword() || !IsNumberedName(node.Name(), kBranchPattern)) return false;
     const KvfSection& section = *AsSection(&node);
     RiverBranch& branch = network_.branches.emplace_back();
     branch.line = static_cast<int>(section.line);
@@ -182,7 +172,7 @@ class RiverNetworkReader {
   bool TakeJunction(const KvfNode& node, RiverJunction& junction) {
     const bool isNone = node.count == 0 || (node.count == 1 && node.params[0].IsText() && node.params[0].length == 0);
     if (isNone) return true;
-    if (node.count != 2 || node.params[0].type != KvfType::String || !IsNumber(node.params[1]))
+    if (node.count != 2 || node.params[0].type != KvfType::String || !IsKvfNumber(node.params[1]))
       return RefusePart(node, "the name of a branch and a chainage were");
     junction = {std::string(node.params[0].Text()), KvfNumber(node.params[1])};
     return true;
@@ -275,7 +265,7 @@ std::string PointsText(const CYbSimpleRiverData& network) {
 
 std::string BranchText(const RiverBranch& branch, std::size_t number) {
   KvfFile file;
-  KvfSection& section = *file.AddSection(file.top, KvfKind::Section, fmt::format("{}{}", kBranchPrefix, number));
+  KvfSection& section = *file.AddSection(file.top, KvfKind::Section, NumberedName(kBranchPattern, number));
   file.BeginKeyword(section, "Name");
   AddText(file, branch.name);
   file.BeginKeyword(section, "TopoID");
@@ -288,8 +278,8 @@ std::string BranchText(const RiverBranch& branch, std::size_t number) {
   AddJunction(file, section, "Downstream", branch.downstream);
   std::string text;
   AppendKvfNodes(section, kInBranch, text);
-  return IndentedLine(kInSection, fmt::format("section {}{} {{\n", kBranchPrefix, number)) + branch.others + text +
-         IndentedLine(kInSection, "}\n");
+  return IndentedLine(kInSection, fmt::format("section {} {{\n", NumberedName(kBranchPattern, number))) +
+         branch.others + text + IndentedLine(kInSection, "}\n");
 }
 
 }  // namespace

@@ -20,10 +20,9 @@ namespace {
 class CellReader {
  public:
   CellReader(const CTvn2DOrthoRotatedGridData& domain, ProgressPart progress) : progress_(progress) {
-    const GridGeometry geometry = domain.Geometry();
-    for (int row = 0; row < geometry.ny; ++row)
-      for (int column = 0; column < geometry.nx; ++column)
-        if (!domain.IsEmptyValue(domain.Value(column, row))) cells_.push_back({0, domain.CellCentre(column, row)});
+    const std::vector<SectionPoint> centres = CentresOf(domain);
+    for (std::size_t i = 0; i < centres.size(); ++i)
+      if (!domain.IsEmptyValue(domain.Values()[i])) cells_.push_back(centres[i]);
   }
 
   std::size_t Count() const { return cells_.size(); }

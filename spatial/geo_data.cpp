@@ -2,6 +2,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "spatial/geo_data.h"
 
+#include <map>
+#include <mutex>
+
 #include <fmt/format.h>
 
 #include "simspec/conditions.h"
@@ -20,8 +23,21 @@ Condition GroundParametersBy(int distribution) {
       {distribution}, false);
 }
 
+namespace {
+
+/// The rule of a quantity of water movement, made once for each way to tell parameters: layers have many of them.
+const Condition& WaterMovementBy(int distribution) {
+  static const auto rule = [](int by) { return Component(&CModelCompKvf::WM) && GroundParametersBy(by); };
+  static std::map<int, Condition> rules;
+  static std::mutex mutex;
+  const std::lock_guard lock(mutex);
+  return rules.try_emplace(distribution, rule(distribution)).first->second;
+}
+
+}  // namespace
+
 CGeoDataWM2DKvf::CGeoDataWM2DKvf(Data2DKind kind, int distribution, CYbSEKvfBase* parent)
-    : JudgedData2DKvf(std::move(kind), Component(&CModelCompKvf::WM) && GroundParametersBy(distribution), parent) {}
+    : JudgedData2DKvf(std::move(kind), WaterMovementBy(distribution), parent) {}
 
 int JudgedData2DKvf::ValidateData() {
   const int isValid = CData2DKvf::ValidateData();

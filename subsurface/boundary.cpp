@@ -36,15 +36,10 @@ bool MeansUndefined(double coordinate, int version) {
 }  // namespace
 
 CGeoDataBoundCondItemKvf::CGeoDataBoundCondItemKvf(CYbSEKvfBase* parent)
-    : CYbSEKvfBase("OuterBoundaryProp", "OuterBoundaryProp_%d", parent),
-      seriesFile_(NewChild<CFMData0DFile>("TIME_SERIES_FILE")),
-      gridFile_(NewChild<CFMData2DNdsFile>()) {
+    : CYbSEKvfBase("OuterBoundaryProp", "OuterBoundaryProp_%d", parent) {
   SetPage(kBoundarySegmentPage);
-  const auto itemType = [this] { return GetBoundaryQuantity(); };
-  seriesFile_->UsedWhen(!Is(BoundaryType, kZeroFlux) && Is(Type, kSeries));
-  seriesFile_->SetItemTypeBy(itemType);
-  gridFile_->UsedWhen(Is(BoundaryType, kFixedHead) && Is(Type, kGridSeries));
-  gridFile_->SetItemTypeBy(itemType);
+  MakeFiles(
+      *this, [this] { return GetBoundaryQuantity(); }, !Is(BoundaryType, kZeroFlux), Is(BoundaryType, kFixedHead));
 }
 
 double CGeoDataBoundCondItemKvf::GetUndefinedValue() { return kUndefinedCoordinate; }

@@ -11,28 +11,20 @@
 
 #include "core/list.h"
 #include "spatial/domain_boundary.h"
-#include "spatial/file_nodes.h"
+#include "subsurface/valued_boundary.h"
 
 namespace tervane {
 
-class CGeoDataBoundCondItemKvf : public CYbSEKvfBase {
+class CGeoDataBoundCondItemKvf : public CYbSEKvfBase, public ValuedBoundary {
  public:
   explicit CGeoDataBoundCondItemKvf(CYbSEKvfBase* parent);
 
   enum Boundary : int { kZeroFlux = 0, kFixedHead = 1, kFlux = 2, kGradient = 3 };
   static constexpr KeyChoice kBoundaryTypes[] = {
       {kZeroFlux, "Zero-Flux"}, {kFixedHead, "Fixed Head"}, {kFlux, "Flux"}, {kGradient, "Gradient"}};
-  /// How the value is given, `Type`.
-  enum Value : int { kInitialValue = 0, kConstant = 1, kSeries = 2, kGridSeries = 3 };
 
   std::string Name;
   double X = GetUndefinedValue(), Y = GetUndefinedValue();  ///< Where the segment starts.
-  int BoundaryType = kZeroFlux;
-  float FixedValue = 0;
-  int Type = kInitialValue;
-
-  CFMData0DFile& SeriesFile() const { return *seriesFile_; }
-  CFMData2DNdsFile& GridFile() const { return *gridFile_; }
 
   /// Takes another type and corrects `Type` for a flux and a gradient.
   void SetBoundaryType(int type);
@@ -50,8 +42,6 @@ class CGeoDataBoundCondItemKvf : public CYbSEKvfBase {
   void ExchangeKeys(KeyExchange& keys) override;
 
  private:
-  CFMData0DFile* seriesFile_;
-  CFMData2DNdsFile* gridFile_;
   mutable std::string shownTitle_;
 };
 

@@ -47,7 +47,7 @@ struct ClassAndRule {
   const char* className;
   Condition rule;
 };
-ClassAndRule Told(Rule rule) {
+ClassAndRule MakeRule(Rule rule) {
   const auto transport = [](TransportProperty property) {
     return ClassAndRule{"CGeoDataAD2DKvf", TransportNeeds(property) && GroundParametersBy(CSatZoneKvf::kByLayers)};
   };
@@ -84,6 +84,16 @@ ClassAndRule Told(Rule rule) {
                                             SubsurfaceIs({kWithRewetting}) && FlagOfZone(&CSatZoneKvf::Threshold)};
   }
   return {};
+}
+
+/// The same, made once: all layers share their rules.
+const ClassAndRule& Told(Rule rule) {
+  static const std::vector<ClassAndRule> told = [] {
+    std::vector<ClassAndRule> made;
+    for (int i = 0; i <= static_cast<int>(Rule::Rewetting); ++i) made.push_back(MakeRule(static_cast<Rule>(i)));
+    return made;
+  }();
+  return told[static_cast<std::size_t>(rule)];
 }
 
 const char* WhyOutside(GroundProperty::Range range, float value) {
@@ -126,7 +136,7 @@ Condition TransportNeeds(TransportProperty property) {
 
 void MakeProperties(CYbSEKvfBase& owner, std::span<const GroundProperty> rows, bool mayLeaveCells) {
   for (const GroundProperty& row : rows) {
-    const ClassAndRule told = Told(row.rule);
+    const ClassAndRule& told = Told(row.rule);
     using Relative = Data2DKind::RelativeToGround;
     Data2DKind kind{.className = told.className,
                     .section = row.section,

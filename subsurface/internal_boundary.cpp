@@ -70,16 +70,12 @@ int CSZVerDiscrInternalBoundaryPropConducKvf::ValidateData() {
 }
 
 CSZVerDiscrInternalBoundaryPropKvf::CSZVerDiscrInternalBoundaryPropKvf(CYbSEKvfBase* parent)
-    : CodedZoneProp(kBoundaryKeys, "Boundary Properties", "InternalBoundaryProp", parent),
-      seriesFile_(NewChild<CFMData0DFile>("TIME_SERIES_FILE")),
-      gridFile_(NewChild<CFMData2DNdsFile>()) {
+    : CodedZoneProp(kBoundaryKeys, "Boundary Properties", "InternalBoundaryProp", parent) {
   SetPage(kInternalBoundaryPage);
   const Condition hasValue = !Is(BoundaryType, {kNone, kInactive});
   const Condition isLeaky = Is(BoundaryType, {kHeadControlledFlux, kDrain, kRiver});
-  seriesFile_->UsedWhen(hasValue && Is(Type, kSeries));
-  gridFile_->UsedWhen(hasValue && Is(Type, kGridSeries));
-  for (DataFileNode* file : {static_cast<DataFileNode*>(seriesFile_), static_cast<DataFileNode*>(gridFile_)})
-    file->SetItemTypeBy([this] { return GetBoundaryItemType(); });
+  MakeFiles(
+      *this, [this] { return GetBoundaryItemType(); }, hasValue, hasValue);
   NewChild<CData2DKvf>(kLeakageCoefficientKind, isLeaky && Is(HeadControlLeakage, kLeakageCoefficient));
   NewChild<CSZVerDiscrInternalBoundaryPropConducKvf>(kConductanceKind, isLeaky && Is(HeadControlLeakage, kConductance));
   NewChild<CData2DKvf>(kRiverBottomKind, Is(BoundaryType, kRiver));

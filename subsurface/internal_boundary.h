@@ -9,6 +9,7 @@
 
 #include "spatial/geo_data.h"
 #include "spatial/zones.h"
+#include "subsurface/valued_boundary.h"
 
 namespace tervane {
 
@@ -20,7 +21,7 @@ class CSZVerDiscrInternalBoundaryPropConducKvf : public CData2DKvf {
 };
 
 /// A boundary: a zone with its type, and how its value is given.
-class CSZVerDiscrInternalBoundaryPropKvf : public CodedZoneProp {
+class CSZVerDiscrInternalBoundaryPropKvf : public CodedZoneProp, public ValuedBoundary {
  public:
   explicit CSZVerDiscrInternalBoundaryPropKvf(CYbSEKvfBase* parent);
 
@@ -33,17 +34,9 @@ class CSZVerDiscrInternalBoundaryPropKvf : public CodedZoneProp {
     kRiver = 5,
     kInactive = 6
   };
-  /// How the value is given, `Type`.
-  enum Value : int { kInitialValue = 0, kConstant = 1, kSeries = 2, kGridSeries = 3 };
   enum Leakage : int { kConductance = 0, kLeakageCoefficient = 1 };
 
-  float FixedValue = 0;
-  int BoundaryType = kNone;
-  int Type = kInitialValue;
   int HeadControlLeakage = kConductance;
-
-  CFMData0DFile& SeriesFile() const { return *seriesFile_; }
-  CFMData2DNdsFile& GridFile() const { return *gridFile_; }
 
   /// Takes another type and corrects `Type`, so that it stands among those that go with it.
   void SetBoundaryType(int type);
@@ -56,10 +49,6 @@ class CSZVerDiscrInternalBoundaryPropKvf : public CodedZoneProp {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
-
- private:
-  CFMData0DFile* seriesFile_;
-  CFMData2DNdsFile* gridFile_;
 };
 
 /// The boundaries inside a computational layer.

@@ -19,7 +19,8 @@ void DescribeSeriesFile(PageForm& form, const CYbSEDlgBase& page, const std::str
       .ShownWhen(isShown);
   form.Button("Create...",
               [&page, &file, first = std::move(first)] {
-                CTvnCreate0DNdsDlg dialog(page.Context(), page.Node(), first.value, first.itemTypes, first.valueTypes);
+                CTvnCreate0DNdsDlg dialog(page.Context(), page.Node(), first.value,
+                                          first.itemTypesBy ? first.itemTypesBy() : first.itemTypes, first.valueTypes);
                 if (*first.quantity) dialog.SetTitle(fmt::format("{} {}", page.Node().GetTitle(), first.quantity));
                 if (const auto made = dialog.Run()) {
                   file.Choose(*made);

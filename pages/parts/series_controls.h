@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -14,9 +15,10 @@ namespace tervane {
 /// offered.
 struct FirstSeries {
   const float& value;
-  std::vector<int> itemTypes;
+  std::vector<int> itemTypes = {};
   std::vector<int> valueTypes = {};
-  const char* quantity = "";  ///< Where the page has several: told in the title of the file.
+  const char* quantity = "";                           ///< Where the page has several: told in the title of the file.
+  std::function<std::vector<int>()> itemTypesBy = {};  ///< Asked instead, where other values decide them.
 };
 
 /// The controls of a file of a series: the file, and buttons that show it and make a first one.

@@ -11,50 +11,51 @@ namespace tervane {
 
 namespace {
 
-enum Way : int { kInitialValue = 0, kConstant = 1, kSeries = 2, kGridSeries = 3 };
-
-void DescribeWays(PageForm& form, const BoundaryValue& boundary, const BoundaryValue::Words& words) {
+void DescribeWays(PageForm& form, const BoundaryValue& told, const BoundaryValue::Words& words) {
   std::vector<std::string> texts(kBoundaryValueTypes + words.first, kBoundaryValueTypes + words.last + 1);
-  if (words.first == kConstant) texts.front() = "Constant";
+  if (words.first == ValuedBoundary::kConstant) texts.front() = "Constant";
   form.Choice(
-          boundary.typeLabel, [type = &boundary.type, first = words.first] { return *type - first; },
-          [type = &boundary.type, first = words.first](int choice) { *type = choice + first; }, std::move(texts))
+          told.typeLabel, [type = &told.boundary.Type, first = words.first] { return *type - first; },
+          [type = &told.boundary.Type, first = words.first](int choice) { *type = choice + first; }, std::move(texts))
       .Key("Type")
-      .ShownWhen(Is(boundary.boundary, words.boundaries))
+      .ShownWhen(Is(told.boundary.BoundaryType, words.boundaries))
       .Revalidates();
 }
 
 }  // namespace
 
-void DescribeBoundaryValue(PageForm& form, const CYbSEDlgBase& page, const BoundaryValue& boundary) {
-  for (const BoundaryValue::Words& words : boundary.words) DescribeWays(form, boundary, words);
+void DescribeBoundaryValue(PageForm& form, const CYbSEDlgBase& page, const BoundaryValue& told) {
+  for (const BoundaryValue::Words& words : told.words) DescribeWays(form, told, words);
   std::vector<int> all;
-  for (const BoundaryValue::Words& words : boundary.words) {
-    const Condition isMeant = Is(boundary.boundary, words.boundaries);
-    form.Number(words.value, boundary.value)
-        .QuantityBy(boundary.itemType)
-        .ShownWhen(isMeant && Is(boundary.type, kConstant));
-    DescribeSeriesFile(form, page, words.series, boundary.series, {boundary.value, {boundary.itemType()}},
-                       isMeant && Is(boundary.type, kSeries));
+  for (const BoundaryValue::Words& words : told.words) {
+    const Condition isMeant = Is(told.boundary.BoundaryType, words.boundaries);
+    form.Number(words.value, told.boundary.FixedValue)
+        .QuantityBy(told.itemType)
+        .ShownWhen(isMeant && Is(told.boundary.Type, ValuedBoundary::kConstant));
+    DescribeSeriesFile(form, page, words.series, told.boundary.SeriesFile(),
+                       {.value = told.boundary.FixedValue,
+                        .itemTypesBy = [itemType = told.itemType] { return std::vector{itemType()}; }},
+                       isMeant && Is(told.boundary.Type, ValuedBoundary::kSeries));
     all.insert(all.end(), words.boundaries.begin(), words.boundaries.end());
   }
   // A file may hold it for a kind of boundary that does not offer it.
-  const Condition byGrid = Is(boundary.type, kGridSeries) && Is(boundary.boundary, all);
-  form.DataFile("Time varying nds2 file:", boundary.grid)
-      .Filter(boundary.gridFilter)
+  const Condition byGrid = Is(told.boundary.Type, ValuedBoundary::kGridSeries) && Is(told.boundary.BoundaryType, all);
+  form.DataFile("Time varying nds2 file:", told.boundary.GridFile())
+      .Filter(told.gridFilter)
       .DefaultExtension("nds2")
       .ShownWhen(byGrid);
-  form.Button("Edit...", [&page, grid = &boundary.grid] { EditDataFile(page.Context(), page.Node(), grid->File); })
+  form.Button("Edit...",
+              [&page, grid = &told.boundary.GridFile()] { EditDataFile(page.Context(), page.Node(), grid->File); })
       .ShownWhen(byGrid);
 }
 
-void ChartOfBoundary(PageForm& form, const BoundaryValue& boundary) {
+void ChartOfBoundary(PageForm& form, const BoundaryValue& told) {
   std::vector<int> all;
-  for (const BoundaryValue::Words& words : boundary.words)
+  for (const BoundaryValue::Words& words : told.words)
     all.insert(all.end(), words.boundaries.begin(), words.boundaries.end());
-  form.Chart(WithFurtherSeries([series = &boundary.series] { return FileChart(*series); },
-                               [series = &boundary.series] { return OffersBeside(*series, {}, {}); }))
-      .ShownWhen(Is(boundary.boundary, all) && Is(boundary.type, kSeries));
+  form.Chart(WithFurtherSeries([series = &told.boundary.SeriesFile()] { return FileChart(*series); },
+                               [series = &told.boundary.SeriesFile()] { return OffersBeside(*series, {}, {}); }))
+      .ShownWhen(Is(told.boundary.BoundaryType, all) && Is(told.boundary.Type, ValuedBoundary::kSeries));
 }
 
 }  // namespace tervane

@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "forms/page.h"
-#include "spatial/file_nodes.h"
+#include "subsurface/valued_boundary.h"
 
 namespace tervane {
 
@@ -24,11 +24,7 @@ struct BoundaryValue {
     std::string series;
   };
 
-  const int& boundary;
-  int& type;
-  float& value;
-  CFMData0DFile& series;
-  CFMData2DNdsFile& grid;
+  ValuedBoundary& boundary;
   std::function<int()> itemType;
   std::string typeLabel;
   const char* gridFilter;
@@ -36,8 +32,8 @@ struct BoundaryValue {
 };
 
 /// Its controls. The grid file is edited on the setup's backdrop.
-void DescribeBoundaryValue(PageForm& form, const CYbSEDlgBase& page, const BoundaryValue& boundary);
+void DescribeBoundaryValue(PageForm& form, const CYbSEDlgBase& page, const BoundaryValue& told);
 /// The chart of its series, over the simulation's period, while there is one.
-void ChartOfBoundary(PageForm& form, const BoundaryValue& boundary);
+void ChartOfBoundary(PageForm& form, const BoundaryValue& told);
 
 }  // namespace tervane

@@ -24,12 +24,6 @@ namespace {
 
 constexpr double kNone = std::numeric_limits<double>::quiet_NaN();
 
-std::vector<double> Differences(const std::vector<double>& a, const std::vector<double>& b) {
-  std::vector<double> differences(a.size());
-  std::ranges::transform(a, b, differences.begin(), std::minus<>());
-  return differences;
-}
-
 /// What stands at one place, where all that it asks is computed.
 class ColumnReader {
  public:
@@ -240,31 +234,8 @@ MapContent GroundViews::ThicknessMap(std::size_t layer) {
     return GridMap(zone_, thickness_->grid);
   now->grid = std::make_shared<ComputedGrid>(
       fmt::format("Thickness of {}", layers[layer - 1].name),
-      [ground = now->ground, bottoms = now->bottoms](CTvn2DOrthoRotatedGridData& grid, ProgressPart) -> FileResult {
-        const CTvn2DOrthoRotatedGridData* cells = ground.grid.get();
-        for (const Level& bottom : bottoms)
-          if (!cells) cells = bottom.grid.get();
-        if (!cells) return {"It is the same everywhere.", {}};
-        const GridGeometry geometry = cells->Geometry();
-        std::vector<SectionPoint> points;
-        points.reserve(static_cast<std::size_t>(geometry.nx) * static_cast<std::size_t>(geometry.ny));
-        for (int row = 0; row < geometry.ny; ++row)
-          for (int column = 0; column < geometry.nx; ++column) points.push_back({0, cells->CellCentre(column, row)});
-        const std::vector<double> none(points.size(), kNone);
-        const std::vector<double> heights = ElevationsAlong(ground, points, none, GridSampling::Nearest);
-        std::vector<double> above = heights, bottom;
-        for (const Level& level : bottoms) {
-          if (!bottom.empty()) above = bottom;
-          bottom = ElevationsAlong(level, points, heights, GridSampling::Nearest);
-          for (std::size_t i = 0; i < bottom.size(); ++i) bottom[i] = std::fmin(bottom[i], above[i]);
-        }
-        constexpr float kDelete = -1e-35f;
-        std::vector<float> values;
-        values.reserve(points.size());
-        for (const double thick : Differences(above, bottom))
-          values.push_back(std::isnan(thick) ? kDelete : static_cast<float>(thick));
-        constexpr int kMetre = 1000;
-        return {grid.TakeValues(geometry, std::move(values), kDelete, kMetre, quantity::kLayerThickness), {}};
+      [ground = now->ground, bottoms = now->bottoms](CTvn2DOrthoRotatedGridData& grid, ProgressPart) {
+        return FileResult{ThicknessOf(ground, bottoms, grid), {}};
       });
   thickness_ = now;
   return GridMap(zone_, thickness_->grid);

@@ -23,11 +23,7 @@ void DescribeBoundary(PageForm& form, CSZVerDiscrInternalBoundaryPropKvf& n, CYb
     return BoundaryValue::Words{std::move(boundaries), first, last, label, label + " Time Series File"};
   };
   const BoundaryValue value{
-      .boundary = n.BoundaryType,
-      .type = n.Type,
-      .value = n.FixedValue,
-      .series = n.SeriesFile(),
-      .grid = n.GridFile(),
+      .boundary = n,
       .itemType = [&n] { return n.GetBoundaryItemType(); },
       .typeLabel = "Data Type",
       .gridFilter = "Time varying (*.nds2) |*.nds2|All Files (*.*) |*.*||",

@@ -155,11 +155,7 @@ void CGeoDataBoundCondItemDlg::Describe(PageForm& form) {
     return BoundaryValue::Words{std::move(boundaries), first, last, "Value:", "Time Series File:"};
   };
   const BoundaryValue value{
-      .boundary = n.BoundaryType,
-      .type = n.Type,
-      .value = n.FixedValue,
-      .series = n.SeriesFile(),
-      .grid = n.GridFile(),
+      .boundary = n,
       .itemType = [&n] { return n.GetBoundaryQuantity(); },
       .typeLabel = "Data Type",
       .gridFilter = "Time varying file (*.nds2) |*.nds2|All Files (*.*) |*.*||",
