@@ -43,8 +43,8 @@ bool LooksSame(const Series& a, const Series& b) {
     return std::bit_cast<std::uint64_t>(x) == std::bit_cast<std::uint64_t>(y);
   };
   return a.name == b.name && a.unit == b.unit && a.isStepped == b.isStepped && a.panel == b.panel &&
-         a.color == b.color && a.times == b.times && std::ranges::equal(a.positions, b.positions, sameBits) &&
-         std::ranges::equal(a.values, b.values, sameBits);
+         a.isLogarithmic == b.isLogarithmic && a.color == b.color && a.times == b.times &&
+         std::ranges::equal(a.positions, b.positions, sameBits) && std::ranges::equal(a.values, b.values, sameBits);
 }
 
 }  // namespace
@@ -126,6 +126,8 @@ std::string Summary(const SeriesContent& content) {
   if (content.numbers)
     text += fmt::format(", over {} [{}]{}", content.numbers->title, content.numbers->unit,
                         content.numbers->isLogarithmic ? ", logarithmic" : "");
+  for (const Series& series : content.series)
+    if (series.isLogarithmic) text += fmt::format(", {} on a logarithmic axis", series.name);
   const auto count = [&](TimeBar::Kind kind) { return std::ranges::count(content.bars, kind, &TimeBar::kind); };
   if (!content.bars.empty())
     text += fmt::format(", {} bars, {} gaps, {} overlaps", count(TimeBar::Kind::Thing), count(TimeBar::Kind::Gap),

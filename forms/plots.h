@@ -189,6 +189,7 @@ struct SectionCurve {
   std::string name;
   Level level;
   bool isDashed = false;
+  bool isStepped = false;  ///< Values hold for whole cells, as those of zones do.
 
   bool operator==(const SectionCurve&) const = default;
 };
@@ -252,6 +253,8 @@ struct Series {
   bool isStepped = false;              ///< The value holds over the interval that ends at its time.
   std::vector<double> positions = {};  ///< In the place of times, for a chart over numbers (`SeriesContent::numbers`).
   int panel = 0;                       ///< Which of several charts below each other, from 0.
+  /// Its values stand on a logarithmic axis, which has no place for those that are not above 0.
+  bool isLogarithmic = false;
   /// The number of its colour, where it is not that of its place among the series.
   std::optional<std::size_t> color = {};
 };

@@ -46,15 +46,14 @@ SeriesContent SoilChart(const Library& /*library*/, const LibraryEntry& entry) {
     chart.message = "The values of the soil make no curves: see its findings.";
     return chart;
   }
-  Series retention = SoilCurve("Water content", "", 0), conductivity = SoilCurve("Conductivity", "log10(m/s)", 1);
+  Series retention = SoilCurve("Water content", "", 0), conductivity = SoilCurve("Conductivity", "m/s", 1);
+  conductivity.isLogarithmic = true;
   for (int i = 0; i <= (kLastDecade - kFirstDecade) * kPointsOfDecade; ++i) {
     const double suction = std::pow(10, kFirstDecade + static_cast<double>(i) / kPointsOfDecade);
     retention.positions.push_back(suction);
     retention.values.push_back(WaterContent(*soil, suction));
-    // A conductivity that is too small for a number has no logarithm.
-    const double logarithm = std::log10(ConductivityAt(*soil, suction));
     conductivity.positions.push_back(suction);
-    conductivity.values.push_back(std::isfinite(logarithm) ? logarithm : std::nan(""));
+    conductivity.values.push_back(ConductivityAt(*soil, suction));
   }
   chart.series = {std::move(retention), std::move(conductivity)};
   return chart;

@@ -46,23 +46,60 @@ class DateTicker : public QCPAxisTickerDateTime {
   bool isFirst_ = false;
 };
 
+/// Powers of ten. Where ticks are several decades apart, small ones mark the decades between them.
+class PowerTicker : public QCPAxisTickerLog {
+ protected:
+  QVector<double> createSubTickVector(int count, const QVector<double>& ticks) override {
+    constexpr double kMoreThanADecade = 11;
+    if (ticks.size() < 2 || ticks[1] < kMoreThanADecade * ticks[0])
+      return QCPAxisTickerLog::createSubTickVector(count, ticks);
+    QVector<double> decades;
+    for (qsizetype i = 0; i + 1 < ticks.size(); ++i)
+      for (double at = ticks[i] * 10; at < ticks[i + 1] * 0.9; at *= 10) decades.push_back(at);
+    return decades;
+  }
+};
+
+void SetUpNumbers(QCPAxis& axis, bool isLogarithmic) {
+  axis.setNumberFormat("gb");
+  if (isLogarithmic) {
+    // Powers of ten, written out while they are short.
+    constexpr int kDigitsOfPower = 5;
+    axis.setScaleType(QCPAxis::stLogarithmic);
+    axis.setTicker(QSharedPointer<PowerTicker>::create());
+    axis.setNumberPrecision(kDigitsOfPower);
+  } else {
+    axis.setScaleType(QCPAxis::stLinear);
+    axis.setTicker(QSharedPointer<QCPAxisTicker>::create());
+    constexpr int kDigits = 6;
+    axis.setNumberPrecision(kDigits);
+  }
+}
+
 }  // namespace
 
 void SetUpAxis(QCPAxis& axis, const std::optional<NumberAxis>& numbers) {
-  const bool isLogarithmic = numbers && numbers->isLogarithmic;
-  axis.setScaleType(isLogarithmic ? QCPAxis::stLogarithmic : QCPAxis::stLinear);
-  if (!numbers) {
-    axis.setTicker(QSharedPointer<DateTicker>::create());
-  } else if (isLogarithmic) {
-    axis.setTicker(QSharedPointer<QCPAxisTickerLog>::create());
-    // Powers of ten, written out while they are short.
-    axis.setNumberFormat("gb");
-    axis.setNumberPrecision(5);
-  } else {
-    axis.setTicker(QSharedPointer<QCPAxisTicker>::create());
-    axis.setNumberFormat("gb");
-    axis.setNumberPrecision(6);
+  if (numbers) return SetUpNumbers(axis, numbers->isLogarithmic);
+  axis.setScaleType(QCPAxis::stLinear);
+  axis.setTicker(QSharedPointer<DateTicker>::create());
+}
+
+void SetUpValueAxis(QCPAxis& axis, bool isLogarithmic) { SetUpNumbers(axis, isLogarithmic); }
+
+QCPRange WithRoom(const QCPAxis& axis, double below, double above) {
+  const QCPRange range = axis.range();
+  if (axis.scaleType() == QCPAxis::stLogarithmic) {
+    const double size = range.upper > range.lower ? range.upper / range.lower : 10;
+    return {range.lower * std::pow(size, -below), range.upper * std::pow(size, above)};
   }
+  const double size = range.size() > 0 ? range.size() : 1;
+  return {range.lower - below * size, range.upper + above * size};
+}
+
+void MoveAxis(QCPAxis& axis, double part) {
+  const QCPRange range = axis.range();
+  axis.moveRange(axis.scaleType() == QCPAxis::stLogarithmic ? std::pow(range.upper / range.lower, part)
+                                                            : part * range.size());
 }
 
 QString AxisTitle(const std::optional<NumberAxis>& numbers) {

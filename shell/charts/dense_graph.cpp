@@ -14,7 +14,8 @@ void DenseGraph::draw(QCPPainter* painter) {
   getVisibleDataBounds(begin, end, QCPDataRange(0, dataCount()));
   // With fewer points lines are told apart, and look better when they are drawn one by one.
   constexpr int kManyInColumn = 2;
-  if (keyAxis()->scaleType() == QCPAxis::stLinear && end - begin > kManyInColumn * clipRect().width()) {
+  const bool isLinear = keyAxis()->scaleType() == QCPAxis::stLinear && valueAxis()->scaleType() == QCPAxis::stLinear;
+  if (isLinear && end - begin > kManyInColumn * clipRect().width()) {
     DrawColumns(painter, ColumnsOf(begin, end));
     return;
   }

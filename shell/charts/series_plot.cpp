@@ -187,8 +187,16 @@ void SeriesPlot::BuildPanel(int panel) {
     if (series.panel == panel && std::ranges::find(units, series.unit) == units.end()) units.push_back(series.unit);
   const bool hasSecond = units.size() == 2;
   QCPAxis &keys = panels_->Keys(panel), &left = panels_->Values(panel, false), &right = panels_->Values(panel, true);
+  const auto isOnRight = [&](const Series& series) { return hasSecond && series.unit == units[1]; };
+  for (const bool isRight : {false, true}) {
+    bool isLogarithmic = false, isLinear = false;
+    for (const Series& series : content_.series)
+      if (series.panel == panel && isOnRight(series) == isRight)
+        (series.isLogarithmic ? isLogarithmic : isLinear) = true;
+    SetUpValueAxis(isRight ? right : left, isLogarithmic && !isLinear);
+  }
   for (const Series& series : content_.series)
-    if (series.panel == panel) AddCurve(series, &keys, hasSecond && series.unit == units[1] ? &right : &left);
+    if (series.panel == panel) AddCurve(series, &keys, isOnRight(series) ? &right : &left);
   left.setLabel(units.size() == 1 || hasSecond ? ToQt(units[0]) : QString());
   right.setLabel(hasSecond ? ToQt(units[1]) : QString());
   right.setVisible(true);
@@ -271,9 +279,11 @@ void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) 
     // A logarithmic axis has no place for what is not above 0.
     if (std::isnan(time) || (isLogarithmic && time <= 0)) continue;
     isSorted = isSorted && (points.isEmpty() || points.back().key <= time);
+    const bool hasPlace = values->scaleType() == QCPAxis::stLinear || series.values[i] > 0;
+    const double value = hasPlace ? series.values[i] : std::nan("");
     // The value holds since the time before. (The chart's own steps lose all that stands behind a gap.)
-    if (series.isStepped && !points.isEmpty()) points.push_back({points.back().key, series.values[i]});
-    points.push_back({time, series.values[i]});
+    if (series.isStepped && !points.isEmpty()) points.push_back({points.back().key, value});
+    points.push_back({time, value});
   }
   shown->set(points, isSorted);
   graph->setData(shown);
@@ -354,9 +364,8 @@ void SeriesPlot::Fit() {
   for (QCPAxis* axis : panels_->AllValues()) {
     axis->rescale();
     // Curves keep off the frame, but what starts at zero stands on it. Names stand above the curves.
-    const QCPRange range = axis->range();
-    const double size = range.size() > 0 ? range.size() : 1;
-    axis->setRange(range.lower == 0 ? 0 : range.lower - 0.04 * size, range.upper + 0.08 * size);
+    const bool standsOnZero = axis->range().lower == 0;
+    axis->setRange(WithRoom(*axis, standsOnZero ? 0 : 0.04, 0.08));
   }
   if (keys) panels_->Keys().setRange(*keys);
   if (panels_->Keys().range().size() <= 0) panels_->Keys().scaleRange(1.02);
@@ -369,7 +378,6 @@ void SeriesPlot::Zoom(double factor) {
 }
 
 bool SeriesPlot::Press(int key) {
-  const auto move = [this](QCPAxis* axis, double part) { axis->moveRange(part * axis->range().size()); };
   switch (key) {
     case Qt::Key_Plus:
     case Qt::Key_Equal:
@@ -379,16 +387,16 @@ bool SeriesPlot::Press(int key) {
       Zoom(1 / kZoomStep);
       return true;
     case Qt::Key_Left:
-      move(&panels_->Keys(), -0.15);
+      MoveAxis(panels_->Keys(), -0.15);
       break;
     case Qt::Key_Right:
-      move(&panels_->Keys(), 0.15);
+      MoveAxis(panels_->Keys(), 0.15);
       break;
     case Qt::Key_Up:
-      for (QCPAxis* axis : panels_->AllValues()) move(axis, 0.15);
+      for (QCPAxis* axis : panels_->AllValues()) MoveAxis(*axis, 0.15);
       break;
     case Qt::Key_Down:
-      for (QCPAxis* axis : panels_->AllValues()) move(axis, -0.15);
+      for (QCPAxis* axis : panels_->AllValues()) MoveAxis(*axis, -0.15);
       break;
     case Qt::Key_Home:
       Fit();

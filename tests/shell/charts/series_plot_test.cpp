@@ -318,6 +318,35 @@ TEST(SeriesPlot, CurvesOverANumberTellItWithItsUnit) {
   EXPECT_EQ(chart.Chart().graph(0)->dataCount(), 3);
 }
 
+TEST(SeriesPlot, ValuesOnALogarithmicAxisAreTheirOwn) {
+  SeriesContent content;
+  Series conductivity{"Conductivity", "m/s", {}, {1e-5, 1e-7, 0, 1e-9}, false, {1, 10, 100, 1000}};
+  conductivity.isLogarithmic = true;
+  content.series = {conductivity};
+  content.numbers = NumberAxis{"Suction", "m", true};
+  ShownChart chart(content);
+  const QCPAxis& axis = *chart.Chart().yAxis;
+  EXPECT_NEAR(axis.coordToPixel(1e-9) - axis.coordToPixel(1e-7), axis.coordToPixel(1e-7) - axis.coordToPixel(1e-5),
+              1e-6);
+  EXPECT_LT(axis.range().lower, 1e-9);
+  EXPECT_GT(axis.range().lower, 1e-10);
+  EXPECT_EQ(axis.label(), "m/s");
+  EXPECT_EQ(chart.Plot().TextAt(11), "Suction 10 m   Conductivity 1e-07 m/s");
+  // What has no place there is a gap of the curve, and keeps its value in a table.
+  EXPECT_EQ(chart.Plot().TextAt(100), "Suction 100 m   Conductivity no value");
+  EXPECT_THAT(chart.Plot().ValuesAsText().toStdString(), testing::HasSubstr("100\t0\n"));
+  // Up by the same factor at both ends.
+  const QCPRange seen = axis.range();
+  QTest::keyClick(&chart.Chart(), Qt::Key_Up);
+  EXPECT_NEAR(axis.range().upper / seen.upper, axis.range().lower / seen.lower, 1e-9);
+  // One curve beside it that is not meant so, and the axis is an ordinary one.
+  Series other = conductivity;
+  other.isLogarithmic = false;
+  content.series.push_back(other);
+  chart.Plot().Show(content);
+  EXPECT_EQ(axis.scaleType(), QCPAxis::stLinear);
+}
+
 TEST(SeriesPlot, NothingToShowShowsItsMessageUntilThereIsSomething) {
   SeriesContent content;
   content.message = "No time series is chosen.";
