@@ -5,6 +5,9 @@
 #include <algorithm>
 #include <cmath>
 #include <limits>
+#include <utility>
+
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -75,9 +78,35 @@ SectionProfile ProfileOf(const SectionContent& content, double step) {
   }
   for (const SectionLens& lens : content.lenses) profile.lenses.push_back(LensAlong(lens, profile));
   for (const SectionCurve& curve : content.curves)
-    profile.curves.push_back({curve.name, ElevationsAlong(curve.level, profile.points, profile.ground)});
+    profile.curves.push_back(
+        {curve.name, ElevationsAlong(curve.level, profile.points, profile.ground,
+                                     curve.isStepped ? GridSampling::Nearest : GridSampling::Bilinear)});
   profile.screens = ScreensAlong(content);
   return profile;
+}
+
+std::vector<std::vector<std::string>> SectionRows(const SectionProfile& profile) {
+  std::vector<std::string> heads{"Distance [m]", "X", "Y", "Ground [m]"};
+  std::vector<const std::vector<double>*> columns{&profile.ground};
+  const auto add = [&](const std::string& head, const std::vector<double>& values) {
+    heads.push_back(head + " [m]");
+    columns.push_back(&values);
+  };
+  for (const SectionProfile::Band& band : profile.bands) add(band.name + ", bottom", band.bottom);
+  for (const SectionProfile::Lens& lens : profile.lenses) {
+    add(lens.name + ", top", lens.top);
+    add(lens.name + ", bottom", lens.bottom);
+  }
+  for (const SectionProfile::Curve& curve : profile.curves) add(curve.name, curve.heights);
+  std::vector<std::vector<std::string>> rows{std::move(heads)};
+  const auto number = [](double value) { return std::isnan(value) ? std::string() : FormatNumber(value, "%.10g"); };
+  for (std::size_t i = 0; i < profile.points.size(); ++i) {
+    const SectionPoint& point = profile.points[i];
+    auto& row = rows.emplace_back(
+        std::vector<std::string>{number(point.distance), number(point.place.x), number(point.place.y)});
+    for (const auto* column : columns) row.push_back(number((*column)[i]));
+  }
+  return rows;
 }
 
 double StepFor(const SectionContent& content) {

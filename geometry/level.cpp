@@ -22,8 +22,9 @@ std::vector<double> ElevationsAlong(const Level& level, const std::vector<Sectio
     if (toMetres)
       for (double& value : values) value = (*toMetres)(value);
   }
-  if (level.isAboveGround)
-    for (std::size_t i = 0; i < values.size(); ++i) values[i] += ground[i];
+  if (level.reference == Level::Reference::Datum) return values;
+  const double direction = level.reference == Level::Reference::BelowGround ? -1 : 1;
+  for (std::size_t i = 0; i < values.size(); ++i) values[i] = ground[i] + direction * values[i];
   return values;
 }
 

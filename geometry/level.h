@@ -16,9 +16,16 @@ namespace tervane {
 
 /// A level by a grid, in the unit that it tells (metres otherwise), or by one value in metres for all places.
 struct Level {
+  /// What values are counted from.
+  enum class Reference {
+    Datum,        ///< They are elevations.
+    AboveGround,  ///< They are heights above ground, negative below it.
+    BelowGround,  ///< They are depths, positive below ground.
+  };
+
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid = nullptr;  ///< Null for one value.
   KeyNumber<double> value = 0;
-  bool isAboveGround = false;  ///< Values are heights above ground, negative below it; else they are elevations.
+  Reference reference = Reference::Datum;
 
   bool operator==(const Level&) const = default;
 };

@@ -172,6 +172,12 @@ double ConductivityAt(const Soil& soil, double suction) {
 
 // ---- Files
 
+std::optional<Soil> FindSoil(const std::string& path, std::string_view soil) {
+  const auto reading = ReadLibraryOnce(kSoilLibrary, path);
+  const auto place = reading->library.Find(soil);
+  return place ? SoilOf(reading->library.entries[*place]) : std::nullopt;
+}
+
 bool IsSoilDBFileValid(const std::string& path, std::string_view soil) { return WhySoilNotValid(path, soil).empty(); }
 
 std::string WhySoilNotValid(const std::string& path, std::string_view soil) {
@@ -196,6 +202,7 @@ void SetFromTexture(LibraryEntry& soil, const SoilTexture& texture) {
   soil.fields[kSoilSource].text = fmt::format("Carsel and Parrish (1988), {}", LowerCase(texture.name));
   const auto set = [&soil](SoilField field, std::string_view model, std::vector<KeyNumber<double>> numbers) {
     soil.fields[field].text = model;
+    soil.fields[field].isThere = true;
     soil.fields[field].numbers = std::move(numbers);
     // What stood behind the numbers of another model says nothing here.
     soil.fields[field].more.clear();

@@ -43,6 +43,8 @@ double WaterContent(const Soil& soil, double suction);
 /// In m/s, at that suction.
 double ConductivityAt(const Soil& soil, double suction);
 
+/// The soil of that name in a file; nothing where it is not there or has faults.
+std::optional<Soil> FindSoil(const std::string& path, std::string_view soil);
 /// Whether a file is there and holds a soil of that name.
 bool IsSoilDBFileValid(const std::string& path, std::string_view soil);
 /// Why it does not; empty when it does.

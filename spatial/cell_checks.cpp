@@ -36,7 +36,7 @@ class CellReader {
     progress_.ThrowIfCancelled();
     Level level;
     level.value = static_cast<double>(quantity.value);
-    level.isAboveGround = quantity.isAboveGround;
+    if (quantity.isAboveGround) level.reference = Level::Reference::AboveGround;
     if (!quantity.isUniform) {
       level.grid = GridOf(quantity);
       if (!level.grid) level.value = std::numeric_limits<double>::quiet_NaN();

@@ -77,37 +77,11 @@ std::vector<std::optional<float>> ValuesIn(const GridData& domain, const GridDat
 
 namespace {
 
-/// The code of the area of each cell of the domain, nothing where there is none, and the identities of the codes.
-struct CodesOfCells {
-  std::vector<std::optional<float>> codes;
-  bool arePolygons = false;
-  std::map<int, std::string> idOfCode;  ///< Of polygons.
+/// The code of the area of each cell of the domain, nothing where there is none.
+using CodesOfCells = std::vector<std::optional<float>>;
 
-  std::string IdOf(float value) const {
-    const int code = static_cast<int>(std::lround(value));
-    if (!arePolygons) return std::to_string(code);
-    const auto found = idOfCode.find(code);
-    return found == idOfCode.end() ? std::string() : found->second;
-  }
-};
-
-FileResult FindCodes(const GridData& domain, const GridSource& areas, ProgressPart progress, CodesOfCells& found) {
-  GridData grid;
-  ZoneTable zones;
-  const bool isPolygons = areas.type == CData2DKvf::kShapeFile;
-  const PolygonFile polygons{areas.file, areas.attribute, areas.gapFill, areas.axisUnit};
-  FileResult result =
-      isPolygons ? grid.CreateGridData_GIS_Polygon(areas.geometry, kUsualDeleteValue, polygons, zones, progress)
-                 : ReadGridData(areas.file, areas.item, grid, progress);
-  if (!result.Ok()) return result;
-  found.arePolygons = isPolygons;
-  for (const ZoneTable::Zone& zone : zones.zones) found.idOfCode[zone.code] = zone.text;
-  found.codes = ValuesIn(domain, grid);
-  return result;
-}
-
-void CountCodes(const CodesOfCells& found, AreaCells& cells) {
-  for (const std::optional<float>& code : found.codes) {
+void CountCodes(const CodesOfCells& codes, const AreaCodes& found, AreaCells& cells) {
+  for (const std::optional<float>& code : codes) {
     if (code)
       ++cells.cellsOfId[found.IdOf(*code)];
     else
@@ -117,10 +91,30 @@ void CountCodes(const CodesOfCells& found, AreaCells& cells) {
 
 }  // namespace
 
+std::string AreaCodes::IdOf(float value) const {
+  const int code = static_cast<int>(std::lround(value));
+  if (!arePolygons) return std::to_string(code);
+  const auto found = idOfCode.find(code);
+  return found == idOfCode.end() ? std::string() : found->second;
+}
+
+FileResult ReadAreaCodes(const GridSource& areas, ProgressPart progress, AreaCodes& codes) {
+  ZoneTable zones;
+  const bool isPolygons = areas.type == CData2DKvf::kShapeFile;
+  const PolygonFile polygons{areas.file, areas.attribute, areas.gapFill, areas.axisUnit};
+  FileResult result =
+      isPolygons ? codes.grid.CreateGridData_GIS_Polygon(areas.geometry, kUsualDeleteValue, polygons, zones, progress)
+                 : ReadGridData(areas.file, areas.item, codes.grid, progress);
+  if (!result.Ok()) return result;
+  codes.arePolygons = isPolygons;
+  for (const ZoneTable::Zone& zone : zones.zones) codes.idOfCode[zone.code] = zone.text;
+  return result;
+}
+
 FileResult CountCells(const GridData& domain, const GridSource& areas, ProgressPart progress, AreaCells& cells) {
-  CodesOfCells found;
-  FileResult result = FindCodes(domain, areas, progress, found);
-  if (result.Ok()) CountCodes(found, cells);
+  AreaCodes found;
+  FileResult result = ReadAreaCodes(areas, progress, found);
+  if (result.Ok()) CountCodes(ValuesIn(domain, found.grid), found, cells);
   return result;
 }
 
@@ -132,16 +126,17 @@ FileResult ComputeZoneAreas(const DomainSource& domain, const GridSource& zones,
   areas = {};
   areas.allCells = CountInside(grid);
   areas.cellArea = grid.Geometry().cellSize * grid.Geometry().cellSize;
-  CodesOfCells found;
-  FileResult result = FindCodes(grid, zones, progress.Part(0.5, 1), found);
+  AreaCodes found;
+  FileResult result = ReadAreaCodes(zones, progress.Part(0.5, 1), found);
   if (!result.Ok()) return result;
-  CountCodes(found, areas.cells);
+  const CodesOfCells codes = ValuesIn(grid, found.grid);
+  CountCodes(codes, found, areas.cells);
   if (!ground) return result;
   std::map<std::string, std::pair<double, std::size_t>> sums;
   const std::vector<std::optional<float>> elevations = ValuesIn(grid, *ground);
-  for (std::size_t cell = 0; cell < found.codes.size(); ++cell) {
-    if (!found.codes[cell] || !elevations[cell]) continue;
-    auto& [sum, count] = sums[found.IdOf(*found.codes[cell])];
+  for (std::size_t cell = 0; cell < codes.size(); ++cell) {
+    if (!codes[cell] || !elevations[cell]) continue;
+    auto& [sum, count] = sums[found.IdOf(*codes[cell])];
     sum += static_cast<double>(*elevations[cell]);
     ++count;
   }

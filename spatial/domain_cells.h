@@ -40,6 +40,17 @@ std::vector<std::ptrdiff_t> PlacesOf(const CTvn2DOrthoRotatedGridData& domain, c
 std::vector<std::optional<float>> ValuesIn(const CTvn2DOrthoRotatedGridData& domain,
                                            const CTvn2DOrthoRotatedGridData& grid);
 
+/// The codes of zones or station areas on a grid of their own, and whom a code stands for.
+struct AreaCodes {
+  CTvn2DOrthoRotatedGridData grid;
+  bool arePolygons = false;
+  std::map<int, std::string> idOfCode;  ///< Of polygons.
+
+  /// The identity behind a cell's value.
+  std::string IdOf(float value) const;
+};
+FileResult ReadAreaCodes(const GridSource& areas, ProgressPart progress, AreaCodes& codes);
+
 /// The cells of the domain by the zone or station area that they belong to.
 struct AreaCells {
   std::map<std::string, std::size_t> cellsOfId;

@@ -73,7 +73,7 @@ CUnsatzoneKvf::CUnsatzoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Unsaturated F
   TakesPartWhen(isModelled);
   NewChild<CUZSoilProfileKvf>();
   NewChild<CUZWetlandSoilProfileKvf>();
-  NewChild<CData2DKvf>(kEtSurfaceDepth, OwnEngine() && TwoLayerMethod());
+  etSurfaceDepth_ = NewChild<CData2DKvf>(kEtSurfaceDepth, OwnEngine() && TwoLayerMethod());
   NewChild<CUZGroundWaterDepthListKvf>()->TakesPartWhen(isModelled && !TwoLayerMethod() &&
                                                         Is(ClassificationType, {kAutomatic, kPartialAutomatic}));
   NewChild<CUnSatInitConditionsKvf>()->TakesPartWhen(isModelled && !TwoLayerMethod() &&

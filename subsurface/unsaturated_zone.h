@@ -8,6 +8,8 @@
 
 namespace tervane {
 
+class CData2DKvf;
+
 class CUnsatzoneKvf : public CYbSEKvfBase {
  public:
   explicit CUnsatzoneKvf(CYbSEKvfBase* parent);
@@ -24,10 +26,16 @@ class CUnsatzoneKvf : public CYbSEKvfBase {
   float Max_MP_Column_Exchange_Per_TimeStep = 2;
   int USE_Green_And_Ampt = 0;  ///< 0 or 1.
 
+  /// Of soils of two layers: how far below ground water still rises to the plants.
+  CData2DKvf& EtSurfaceDepth() const { return *etSurfaceDepth_; }
+
   int ValidateData() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
+
+ private:
+  CData2DKvf* etSurfaceDepth_;
 };
 inline constexpr ImportantName<CUnsatzoneKvf> kUnsaturatedZone{"Unsatzone"};
 

@@ -4,6 +4,7 @@
 
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/file_controls.h"
+#include "pages/parts/ground_views.h"
 #include "pages/parts/plot_content.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
@@ -26,7 +27,10 @@ class CData2DDlg : public PageOf<CData2DKvf> {
   void Describe(PageForm& form) override;
 
  private:
+  MapContent QuantityMap();
   MapContent Map();
+
+  GroundViews ground_{*this};
 };
 
 void CData2DDlg::OnRefresh() {
@@ -35,7 +39,7 @@ void CData2DDlg::OnRefresh() {
   UpdateDoc(kDataChanged | kRefreshPlots, "Refresh Map");
 }
 
-MapContent CData2DDlg::Map() {
+MapContent CData2DDlg::QuantityMap() {
   CData2DKvf& n = Node();
   const bool isScattered = n.Type == CData2DKvf::kShapeFile || n.Type == CData2DKvf::kXyzFile;
   if (!n.ShowGridData && !(isScattered && n.ShowShapeData)) return {};
@@ -48,6 +52,12 @@ MapContent CData2DDlg::Map() {
     map.shapes.push_back({std::move(data), {}});
   else if (shapes->IsDone() && map.message.empty())
     map.message = shapes->Problem();
+  return map;
+}
+
+MapContent CData2DDlg::Map() {
+  MapContent map = QuantityMap();
+  ground_.PutOn(map);
   return map;
 }
 
@@ -114,7 +124,9 @@ void CData2DDlg::Describe(PageForm& form) {
   }
   form.Check("Show grid data", n.ShowGridData).ShownWhen(!isUniform);
   form.Check("Show shape raw data", n.ShowShapeData).ShownWhen(isScattered);
+  ground_.DescribeButtons(form, !isUniform);
   form.Map([this] { return Map(); }).ShownWhen(!isUniform);
+  ground_.DescribeSection(form, !isUniform);
 }
 
 }  // namespace

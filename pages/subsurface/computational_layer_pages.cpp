@@ -3,6 +3,7 @@
 #include "pages/subsurface/computational_layer_pages.h"
 
 #include "forms/table_of.h"
+#include "pages/parts/ground_views.h"
 #include "pages/subsurface/saturated_zone_pages.h"
 #include "subsurface/computational_layers.h"
 #include "subsurface/pages.h"
@@ -43,8 +44,8 @@ void DescribeOwnLayers(PageForm& form, CSZVerDiscrLayerListKvf& n, CYbSEDlgBase&
 
 std::span<const PageRow> ComputationalLayerPages() {
   static constexpr PageRow kRows[] = {
-      DescribedBy<DescribeLayersOfGeology>(kComputationalLayersOfGeologyPage),
-      DescribedBy<DescribeOwnLayers>(kComputationalLayersPage),
+      DescribedWithGround<DescribeLayersOfGeology>(kComputationalLayersOfGeologyPage),
+      DescribedWithGround<DescribeOwnLayers>(kComputationalLayersPage),
   };
   return kRows;
 }

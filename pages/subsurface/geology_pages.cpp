@@ -6,6 +6,7 @@
 
 #include "forms/rows_in_step.h"
 #include "forms/table_of.h"
+#include "pages/parts/ground_views.h"
 #include "subsurface/computational_layers.h"
 #include "subsurface/geology.h"
 #include "subsurface/pages.h"
@@ -56,6 +57,7 @@ class CGeoLayerSZDlg : public PageOf<CGeoLayerSZKvf> {
   void CopyToAll(CGeoLayerSZItemKvf& from);
 
   std::shared_ptr<TableOf<CGeoLayerSZItemKvf>> table_;
+  GroundViews ground_{*this};
 };
 
 void CGeoLayerSZDlg::Describe(PageForm& form) {
@@ -99,6 +101,7 @@ void CGeoLayerSZDlg::Describe(PageForm& form) {
               })
       .ToolTip("Adds computational layers at the end, or takes those away that have no geological layer")
       .ShownWhen("the lists differ", differ);
+  ground_.Describe(form);
 }
 
 void CGeoLayerSZDlg::CopyToAll(CGeoLayerSZItemKvf& from) {
@@ -121,7 +124,7 @@ std::span<const PageRow> GeologyPages() {
   static constexpr PageRow kRows[] = {
       DescribedBy<DescribeUnits>(kGeologicalUnitsPage),
       PageIs<CGeoLayerSZDlg, CGeoLayerSZKvf>(kGeologicalLayersPage),
-      DescribedBy<DescribeLenses>(kGeologicalLensesPage),
+      DescribedWithGround<DescribeLenses>(kGeologicalLensesPage),
   };
   return kRows;
 }

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/subsurface/saturated_zone_pages.h"
 
-#include "pages/subsurface/ground_views.h"
+#include "pages/parts/ground_views.h"
 #include "simspec/conditions.h"
 #include "subsurface/ground_properties.h"
 #include "subsurface/pages.h"
@@ -50,24 +50,10 @@ void DescribeSaturatedZone(PageForm& form, CSatZoneKvf& n) {
       .Revalidates();
 }
 
-class CSatZoneDlg : public PageOf<CSatZoneKvf> {
- public:
-  CSatZoneDlg(CYbSEKvfBase& node, const PageContext& context) : PageOf(node, context), views_(*this, Node()) {}
-
- protected:
-  void Describe(PageForm& form) override {
-    DescribeSaturatedZone(form, Node());
-    views_.Describe(form);
-  }
-
- private:
-  GroundViews views_;
-};
-
 }  // namespace
 
 std::span<const PageRow> SaturatedZonePages() {
-  static constexpr PageRow kRows[] = {PageIs<CSatZoneDlg, CSatZoneKvf>(kSaturatedZonePage)};
+  static constexpr PageRow kRows[] = {DescribedWithGround<DescribeSaturatedZone>(kSaturatedZonePage)};
   return kRows;
 }
 

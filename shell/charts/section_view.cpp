@@ -193,6 +193,11 @@ void SectionView::AddScreens() {
     line->start->setCoords(at, units_->height.Shown(screen.top));
     line->end->setCoords(at, units_->height.Shown(screen.bottom));
     screens_.push_back(line);
+    // A well with several has its name above the highest.
+    const bool isHighest = std::ranges::none_of(profile_.screens, [&](const auto& other) {
+      return other.name == screen.name && other.distance == screen.distance && other.top > screen.top;
+    });
+    if (!isHighest) continue;
     auto* name = new QCPItemText(chart_);
     name->position->setCoords(at, units_->height.Shown(screen.top));
     name->setPositionAlignment(Qt::AlignBottom | Qt::AlignHCenter);
@@ -202,20 +207,11 @@ void SectionView::AddScreens() {
 }
 
 QString SectionView::Values() const {
-  QStringList heads{tr("Distance [m]"), tr("X"), tr("Y"), tr("Ground [m]")};
-  for (const SectionProfile::Band& band : profile_.bands) heads << tr("%1, bottom [m]").arg(ToQt(band.name));
-  for (const SectionProfile::Lens& lens : profile_.lenses)
-    heads << tr("%1, top [m]").arg(ToQt(lens.name)) << tr("%1, bottom [m]").arg(ToQt(lens.name));
-  for (const SectionProfile::Curve& curve : profile_.curves) heads << tr("%1 [m]").arg(ToQt(curve.name));
-  QString text = heads.join('\t') + '\n';
-  const auto number = [](double value) { return std::isnan(value) ? QString() : ToQt(FormatNumber(value, "%.10g")); };
-  for (std::size_t i = 0; i < profile_.points.size(); ++i) {
-    const SectionPoint& point = profile_.points[i];
-    QStringList row{number(point.distance), number(point.place.x), number(point.place.y), number(profile_.ground[i])};
-    for (const SectionProfile::Band& band : profile_.bands) row << number(band.bottom[i]);
-    for (const SectionProfile::Lens& lens : profile_.lenses) row << number(lens.top[i]) << number(lens.bottom[i]);
-    for (const SectionProfile::Curve& curve : profile_.curves) row << number(curve.heights[i]);
-    text += row.join('\t') + '\n';
+  QString text;
+  for (const auto& row : SectionRows(profile_)) {
+    QStringList cells;
+    for (const std::string& cell : row) cells << ToQt(cell);
+    text += cells.join('\t') + '\n';
   }
   return text;
 }
