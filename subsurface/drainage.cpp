@@ -71,7 +71,8 @@ CDrainageMFSZItemKvf::CDrainageMFSZItemKvf(CYbSEKvfBase* parent)
   SetPage(kHelpPage);
   NewChild<CGeoDataWM2DKvf>(kDrainCells, CGeoDataWM2DKvf::kAnyDistribution);
   NewChild<CGeoDataWM2DKvf>(kDrainLevel, CGeoDataWM2DKvf::kAnyDistribution);
-  NewImportantChild<CTimeseriesConstKvf>(kDrainTimeConstant, quantity::kDrainageTimeConstant);
+  // The list says which of all answers by their name: a drain that never came into the list must not.
+  timeConstant_ = NewChild<CTimeseriesConstKvf>(quantity::kDrainageTimeConstant);
 }
 
 CDrainageMFSZKvf::CDrainageMFSZKvf(CYbSEKvfBase* parent) : CYbSEKvfListBase("Drainage", "Drainage_Modflow", parent) {
@@ -81,17 +82,35 @@ CDrainageMFSZKvf::CDrainageMFSZKvf(CYbSEKvfBase* parent) : CYbSEKvfListBase("Dra
 
 void CDrainageMFSZKvf::SetItemCount(int count, int level) {
   CYbSEKvfListBase::SetItemCount(count, level);
-  LetLastAnswer();
+  LetLatestAnswer();
 }
 
 void CDrainageMFSZKvf::DeleteItem(int number, int level) {
   CYbSEKvfListBase::DeleteItem(number, level);
-  LetLastAnswer();
+  LetLatestAnswer();
 }
 
-void CDrainageMFSZKvf::LetLastAnswer() {
-  const CDrainageMFSZItemKvf* last = GetItem(GetItemCount());
-  if (last && GetRoot()) GetRoot()->RegisterImportantNode(last->Child<CTimeseriesConstKvf>(), kDrainTimeConstant.text);
+void CDrainageMFSZKvf::InsertItem(int number, int level) {
+  CYbSEKvfListBase::InsertItem(number, level);
+  LetLatestAnswer();
+}
+
+void CDrainageMFSZKvf::ExchangeState(KeyExchange& keys) {
+  CYbSEKvfListBase::ExchangeState(keys);
+  // Undo and redo put the drains back before they come here.
+  if (keys.IsReading()) LetLatestAnswer();
+}
+
+void CDrainageMFSZKvf::LetLatestAnswer() {
+  if (!GetRoot()) return;
+  const CDrainageMFSZItemKvf* latest = nullptr;
+  for (int number = 1; number <= GetItemCount(); ++number)
+    if (const CDrainageMFSZItemKvf* drain = GetItem(number); !latest || drain->Serial() > latest->Serial())
+      latest = drain;
+  if (latest)
+    GetRoot()->RegisterImportantNode(&latest->TimeConstant(), kDrainTimeConstant.text);
+  else
+    GetRoot()->UnregisterImportantNode(kDrainTimeConstant.text);
 }
 
 }  // namespace tervane

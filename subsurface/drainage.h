@@ -31,11 +31,17 @@ class CDrainageSZKvf : public CYbSEKvfBase {
 };
 inline constexpr ImportantName<CDrainageSZKvf> kDrainage{"DRAINAGE"};
 
-/// A drain with a Modflow engine. The latest one that was made answers as "DRAINAGE_TIME_CONSTANT".
+/// A drain with a Modflow engine.
 class CDrainageMFSZItemKvf : public NamedItemKvf {
  public:
   explicit CDrainageMFSZItemKvf(CYbSEKvfBase* parent);
+
+  CTimeseriesConstKvf& TimeConstant() const { return *timeConstant_; }
+
+ private:
+  CTimeseriesConstKvf* timeConstant_;
 };
+/// That of the drain that was made last, of those that the list has.
 inline constexpr ImportantName<CTimeseriesConstKvf> kDrainTimeConstant{"DRAINAGE_TIME_CONSTANT"};
 
 class CDrainageMFSZKvf : public CYbSEKvfListBase<CDrainageMFSZItemKvf> {
@@ -44,13 +50,15 @@ class CDrainageMFSZKvf : public CYbSEKvfListBase<CDrainageMFSZItemKvf> {
 
   void SetItemCount(int count, int level) override;
   void DeleteItem(int number, int level) override;
+  void InsertItem(int number, int level) override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("NumberOfLayers", *this); }
+  void ExchangeState(KeyExchange& keys) override;
 
  private:
-  /// The last drain that is left answers in the place of one that went.
-  void LetLastAnswer();
+  /// Lets the drain answer that was made last, of those that are there now.
+  void LetLatestAnswer();
 };
 inline constexpr ImportantName<CDrainageMFSZKvf> kModflowDrains{"DRAINAGE_MODFLOW"};
 

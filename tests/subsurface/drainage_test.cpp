@@ -5,6 +5,7 @@
 #include <fmt/format.h>
 #include <gmock/gmock.h>
 
+#include "core/undo.h"
 #include "simspec/basic_parameters.h"
 #include "subsurface/saturated_zone.h"
 #include "tests/simspec/test_setup.h"
@@ -69,9 +70,53 @@ TEST(Drainage, ModflowDrainsAreANamedList) {
   EXPECT_EQ(setup.WrittenKeys("SaturatedZone/Drainage_Modflow"), "YbSEKvfListItemCount=3 NumberOfLayers=3");
   EXPECT_EQ(setup.Written("SaturatedZone/Drainage_Modflow/Drainage_Modflow_2/Level:FixedValue"), "5f");
   EXPECT_EQ(setup.Root().Important(kDrainTimeConstant)->GetParent(), drains.GetItem(3));
-  drains.DeleteItem(3, 1);
-  ASSERT_NE(setup.Root().Important(kDrainTimeConstant), nullptr);
-  EXPECT_EQ(setup.Root().Important(kDrainTimeConstant)->GetParent(), drains.GetItem(2));
+}
+
+TEST(Drainage, TheDrainThatWasMadeLastAnswersWhateverHappensToTheOthers) {
+  // What is done, and behind each the drain that answers, by its name. New drains are called A, B, C, ...
+  constexpr auto kNobody = "-";
+  struct Step {
+    const char* what;
+    int number = 0;
+    const char* answers;
+  };
+  const std::vector<Step> cases[] = {
+      {{"insert", 0, "A"}, {"delete", 1, kNobody}, {"undo", 0, "A"}, {"undo", 0, kNobody}, {"redo", 0, "A"}},
+      // In front of another one it is still the last that was made.
+      {{"insert", 0, "A"}, {"insert", 1, "B"}, {"delete", 2, "B"}, {"undo", 0, "B"}, {"delete", 1, "A"}},
+      {{"insert", 0, "A"}, {"insert", 1, "B"}, {"delete", 1, "A"}, {"undo", 0, "B"}, {"redo", 0, "A"}},
+      {{"insert", 0, "A"}, {"insert", 0, "B"}, {"insert", 1, "C"}, {"undo", 0, "B"}, {"undo", 0, "A"}},
+      {{"insert", 0, "A"}, {"insert", 0, "B"}, {"up", 2, "B"}, {"delete", 1, "A"}, {"undo", 0, "B"}},
+      {{"insert", 0, "A"}, {"insert", 0, "B"}, {"clear", 0, kNobody}, {"insert", 0, "C"}, {"undo", 0, kNobody}},
+      // One that only looks as if it came.
+      {{"insert", 0, "A"}, {"make and drop", 0, "A"}, {"delete", 1, kNobody}, {"make and drop", 0, kNobody}},
+  };
+  for (const auto& steps : cases) {
+    TestSetup setup;
+    auto& drains = setup.At<CDrainageMFSZKvf>("SaturatedZone/Drainage_Modflow");
+    UndoStack undo(setup.Root());
+    char next = 'A';
+    std::string done;
+    for (const Step& step : steps) {
+      const std::string_view what = step.what;
+      done += fmt::format(" {} {}", what, step.number);
+      const int before = drains.GetItemCount();
+      if (what == "insert") step.number > 0 ? drains.InsertItem(step.number, 1) : drains.AddItemNode();
+      if (what == "delete") drains.DeleteItem(step.number, 1);
+      if (what == "clear") drains.SetItemCount(0, 1);
+      if (what == "up") drains.MoveItemUp(step.number, 1);
+      if (what == "make and drop") drains.NewItemNode();
+      if (what == "undo") undo.Undo();
+      if (what == "redo") undo.Redo();
+      if (what == "insert" && drains.GetItemCount() > before)
+        drains.GetItem(step.number > 0 ? step.number : drains.GetItemCount())->Name = next++;
+      undo.Commit(step.what);
+      const auto* answering = setup.Root().Important(kDrainTimeConstant);
+      const auto* drain = answering ? dynamic_cast<CDrainageMFSZItemKvf*>(answering->GetParent()) : nullptr;
+      EXPECT_EQ(drain ? drain->Name : kNobody, step.answers) << done;
+      EXPECT_TRUE(!drain || drains.GetNumberWhatIs(drain) > 0) << done;
+    }
+  }
 }
 
 }  // namespace
