@@ -35,7 +35,8 @@ void CheckRows(const LibraryKind& kind, const LibraryEntry& entry, std::size_t p
     const int line = row && entry.rows[*row].line ? entry.rows[*row].line : entry.line;
     findings.push_back({Severity::Error, line, place, row, std::move(text)});
   };
-  for (const auto& [line, text] : entry.refused) findings.push_back({Severity::Error, line, place, {}, text});
+  for (const LibraryRefusal& refusal : entry.refused)
+    findings.push_back({Severity::Error, refusal.line, place, {}, refusal.text});
   const std::size_t before = findings.size();
   for (std::size_t i = 0; i < kind.fields.size(); ++i) {
     const LibraryField& field = kind.fields[i];
@@ -77,6 +78,22 @@ void LibraryEntry::DeleteRow(std::size_t row) {
   rows.erase(rows.begin() + static_cast<std::ptrdiff_t>(row));
   std::string& next = row < rows.size() ? rows[row].context.others : atEnd;
   next = kept + next;
+}
+
+void LibraryEntry::SetRefusedAside() {
+  std::vector<std::string*> places{&atEnd};
+  for (LibraryText& field : fields) places.push_back(&field.context.others);
+  for (LibraryRow& row : rows) places.push_back(&row.context.others);
+  std::erase_if(refused, [&](const LibraryRefusal& refusal) {
+    if (refusal.kept.empty() || (!fields[refusal.field].isThere && fields[refusal.field].text.empty())) return false;
+    for (std::string* place : places) {
+      const std::size_t at = place->find(refusal.kept);
+      if (at == std::string::npos) continue;
+      place->insert(at + refusal.kept.find_first_not_of(' '), "# ");
+      return true;
+    }
+    return false;
+  });
 }
 
 LibraryEntry Library::NewEntry(std::string name) const {

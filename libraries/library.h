@@ -58,6 +58,8 @@ struct LibraryRow {
 struct LibraryRefusal {
   int line = 0;
   std::string text;
+  std::size_t field = 0;  ///< The field that has nothing because of it, where `kept` is given.
+  std::string kept = {};  ///< Its line as it is written again.
 
   bool operator==(const LibraryRefusal&) const = default;
 };
@@ -78,6 +80,9 @@ struct LibraryEntry {
   }
   /// Takes a row out; what stands in front of it and is no part of it stays.
   void DeleteRow(std::size_t row);
+  /// Makes comments of refused lines whose fields were given something since: a later reading takes what was given, and
+  /// nothing of the old line is lost.
+  void SetRefusedAside();
 
   bool operator==(const LibraryEntry&) const = default;
 };

@@ -100,11 +100,12 @@ class LibraryReader {
   bool ReadField(const KvfNode& keyword, LibraryEntry& entry) {
     const auto found = std::ranges::find(kind_.fields, keyword.Name(), &LibraryField::key);
     if (found == kind_.fields.end()) return false;
-    LibraryText& field = entry.fields[static_cast<std::size_t>(found - kind_.fields.begin())];
+    const auto number = static_cast<std::size_t>(found - kind_.fields.begin());
+    LibraryText& field = entry.fields[number];
     if (field.isThere) return Refuse(keyword, "it is there twice; the first is used");
-    if (!found->models.empty()) return ReadNumbers(keyword, *found, field);
+    if (!found->models.empty()) return ReadNumbers(keyword, number, field);
     if (keyword.count != 1 || keyword.params[0].type != KvfType::String)
-      return Refuse(keyword, "one text in quotes was expected");
+      return RefuseField(keyword, number, "one text in quotes was expected");
     field.text = keyword.params[0].Text();
     field.isThere = true;
     TakeContext(keyword, field.context);
@@ -124,7 +125,8 @@ class LibraryReader {
   }
 
   /// A model's name and its parameters, or numbers alone.
-  bool ReadNumbers(const KvfNode& keyword, const LibraryField& declared, LibraryText& field) {
+  bool ReadNumbers(const KvfNode& keyword, std::size_t number, LibraryText& field) {
+    const LibraryField& declared = kind_.fields[number];
     const bool isNamed = !declared.models.front().name.empty();
     const bool hasName = keyword.count > 0 && keyword.params[0].type == KvfType::String;
     const LibraryModel* model = ModelOf(declared, isNamed && hasName ? keyword.params[0].Text() : std::string_view());
@@ -132,11 +134,12 @@ class LibraryReader {
       std::string names;
       for (const LibraryModel& known : declared.models)
         names += fmt::format("{}\"{}\"", names.empty() ? "" : ", ", known.name);
-      return Refuse(keyword, fmt::format("a model and its parameters were expected; models are {}", names));
+      return RefuseField(keyword, number,
+                         fmt::format("a model and its parameters were expected; models are {}", names));
     }
     const std::uint32_t first = isNamed ? 1 : 0;
     const std::size_t count = model->parameters.size();
-    if (!HasNumbers(keyword, first, count)) return Refuse(keyword, NumbersExpected(model->parameters));
+    if (!HasNumbers(keyword, first, count)) return RefuseField(keyword, number, NumbersExpected(model->parameters));
     field.text = model->name;
     field.isThere = true;
     for (std::size_t i = first; i < first + count; ++i) field.numbers.emplace_back(KvfNumber(keyword.params[i]));
@@ -195,6 +198,14 @@ class LibraryReader {
   bool Refuse(const KvfNode& keyword, std::string_view why) {
     library_.entries.back().refused.push_back(
         {static_cast<int>(keyword.line), fmt::format("{} = {}: {}", keyword.Name(), KvfValuesText(keyword), why)});
+    return false;
+  }
+
+  /// The same of a field, which is left without.
+  bool RefuseField(const KvfNode& keyword, std::size_t field, std::string_view why) {
+    Refuse(keyword, why);
+    library_.entries.back().refused.back().field = field;
+    library_.entries.back().refused.back().kept = KvfNodeText(keyword, level_ + 1);
     return false;
   }
 

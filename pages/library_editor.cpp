@@ -340,6 +340,7 @@ LibraryEditor::State LibraryEditor::Now() const {
 }
 
 void LibraryEditor::CommitValue(const std::string& action, const void* source) {
+  if (current_ < library_.entries.size()) library_.entries[current_].SetRefusedAside();
   State now = Now();
   const auto time = std::chrono::steady_clock::now();
   if (!now.HoldsSame(shadow_)) {

@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/library_editor.h"
 
+#include <stdexcept>
+
 #include <gmock/gmock.h>
 
 #include "libraries/soils.h"
@@ -110,6 +112,41 @@ TEST(EditedSoils, ATextureIsOneStepAndModelsShowTheirOwnNumbers) {
   host.Expect("Texture", std::optional<int>());
   page->Press(find("Set from Texture"));
   EXPECT_EQ(editor.UndoName(), "Add Soil");
+}
+
+TEST(EditedSoils, AModelThatIsChosenIsReadAgainAndTheRefusedLineStaysAsAComment) {
+  test::TempFolder folder;
+  const std::string path = folder.Write("a.uzs",
+                                        "target TERVANE_SOILS {\nsection Soil_1 {\nName = \"Loam\"\n"
+                                        "Retention = \"van genuchten\", 0.43, 0.078, 3.6, 1.56  # of 1998\n"
+                                        "Retention = 7\n"
+                                        "Conductivity = \"Mualem\", 2.889e-6, 0.5\nBulkDensity = 1500.0\n}\n}\n");
+  LibraryEditor editor(kSoilLibrary, path);
+  NobodyToAsk host;
+  const auto page = editor.MakePage(
+      host, [] {}, [] {});
+  const auto control = [&](const std::string& label) -> Control& {
+    for (const auto& each : page->Form().Controls())
+      if (each->label == label && each->IsShown()) return *each;
+    throw std::runtime_error(label);
+  };
+  // Another value leaves the line as it stands.
+  ASSERT_EQ(page->Enter(control("Bulk density:"), "1600"), "");
+  ASSERT_TRUE(editor.Save(path).Ok());
+  EXPECT_THAT(test::ReadFile(path), HasSubstr("\n    Retention = \"van genuchten\", 0.43"));
+  EXPECT_FALSE(FindSoil(path, "Loam"));
+
+  ASSERT_EQ(page->Enter(control("Retention:"), "2"), "");
+  EXPECT_THAT(page->Node().Findings(), testing::IsEmpty());
+  ASSERT_TRUE(editor.Save(path).Ok());
+  EXPECT_THAT(test::ReadFile(path), HasSubstr("\n    Retention = \"Campbell\""));
+  EXPECT_THAT(test::ReadFile(path), HasSubstr("    # Retention = \"van genuchten\", 0.43, 0.078, 3.6, 1.56\n"));
+  EXPECT_THAT(test::ReadFile(path), HasSubstr("    # Retention = 7\n"));
+  EXPECT_THAT(test::ReadFile(path), HasSubstr("# of 1998\n"));
+  ASSERT_TRUE(FindSoil(path, "Loam"));
+  EXPECT_EQ(FindSoil(path, "Loam")->retention, Soil::Retention::Campbell);
+  editor.Undo();
+  EXPECT_FALSE(page->Node().Findings().empty());
 }
 
 }  // namespace
