@@ -2,9 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/subsurface/outer_boundary_pages.h"
 
+#include <tuple>
+
 #include <gmock/gmock.h>
 
+#include "data/datafile_facts.h"
 #include "forms/plots.h"
+#include "pages/tree_entries.h"
 #include "platform/item_types.h"
 #include "spatial/domain.h"
 #include "subsurface/computational_layers.h"
@@ -109,6 +113,41 @@ TEST_F(OuterBoundaryPages, APointIsTakenFromTheMap) {
   EXPECT_EQ(Names(), "North South West ");
   EXPECT_EQ(boundary.GetItem(3)->Y, 250);
   EXPECT_FALSE(MapOf(page).request);
+}
+
+TEST_F(OuterBoundaryPages, ANewSeriesHasTheQuantityOfTheKindThatHoldsAtTheClick) {
+  using Segment = CGeoDataBoundCondItemKvf;
+  ASSERT_TRUE(document.OnSaveDocument(folder.File("setup.tvd")));
+  Segment& segment = *boundary.GetItem(1);
+  segment.Type = Segment::kSeries;
+  test::ScriptedHost host;
+  std::string offered;
+  PageContext context{document, host, [](int, const std::string&, const void*) {}};
+  context.runDialog = [&](const std::string&, CYbSEDlgBase& dialog, const std::function<std::string()>& accept) {
+    dialog.Form().ForEach([&](Control& control) {
+      if (control.label == "Quantity:") offered = control.Options().at(0);
+    });
+    return accept().empty();
+  };
+  const auto page = MakePage(*PageClassOf(segment), segment, context);
+  const auto press = [&] {
+    page->Form().ForEach([&](Control& control) {
+      if (control.label == "Create..." && control.IsShown()) page->Press(control);
+    });
+  };
+  const std::tuple<int, const char*, int> kinds[] = {{Segment::kFixedHead, "Elevation", quantity::kElevation},
+                                                     {Segment::kFlux, "Discharge", quantity::kDischarge},
+                                                     {Segment::kGradient, "Head Gradient", quantity::kHeadGradient},
+                                                     {Segment::kFixedHead, "Elevation", quantity::kElevation}};
+  for (const auto& [kind, name, itemType] : kinds) {
+    segment.SetBoundaryType(kind);
+    if (!offered.empty()) host.Expect("does already exist", Host::Answer::Yes);
+    press();
+    EXPECT_EQ(offered, name);
+    const auto facts = DataFileFactsOf(segment.SeriesFile().File.Absolute());
+    ASSERT_EQ(facts->error, "");
+    EXPECT_EQ(facts->items.at(0).itemType, itemType);
+  }
 }
 
 TEST_F(OuterBoundaryPages, ADomainWithoutAClosedBoundaryTellsSoInThePlaceOfTheMap) {
