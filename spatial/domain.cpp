@@ -112,6 +112,36 @@ std::shared_ptr<ComputedGrid> CCatchmentKvf::DomainFromShape() {
   return made_;
 }
 
+namespace {
+
+/// What a user can do about a boundary that cannot be followed, where that is one cell. The trace turns to the inside
+/// first: it cuts each square corner, also the one in which it began, and then never comes back to its start.
+std::string HowToClose(const CTvn2DOrthoRotatedGridData& domain) {
+  const GridGeometry& geometry = domain.Geometry();
+  CGeoDataBoundCondCatchmentData without;
+  if (!without.TakeValues(geometry, domain.Values(), domain.DeleteValue(), domain.ItemUnit(), domain.ItemType())
+           .empty())
+    return {};
+  for (int row = geometry.ny - 1; row >= 0; --row)
+    for (int column = 0; column < geometry.nx; ++column) {
+      if (domain.IsEmptyValue(domain.Value(column, row))) continue;
+      // What is no boundary at all is told by the trace.
+      if (std::floor(domain.Value(column, row) + 0.5F) != 2.0F) return {};
+      const auto place = static_cast<std::size_t>(row) * static_cast<std::size_t>(geometry.nx);
+      without.GetData()[place + static_cast<std::size_t>(column)] = domain.DeleteValue();
+      std::string message;
+      if (!without.PrepareBoundary(message)) return {};
+      return fmt::format(
+          "The line along the boundary begins in a corner, at column {}, row {} from the south, and passes it by on "
+          "its "
+          "way back. Leave this cell out of the domain: then the boundary can be followed.",
+          column + 1, row + 1);
+    }
+  return {};
+}
+
+}  // namespace
+
 std::shared_ptr<Computed<TracedDomain>> CCatchmentKvf::Traced() {
   const bool isShape = Type == kShapeFile;
   const GridSource file = isShape ? GridSource() : CodesOfGrid(*gridFile_);
@@ -128,8 +158,10 @@ std::shared_ptr<Computed<TracedDomain>> CCatchmentKvf::Traced() {
                   } else if (FileResult result = BuildGrid(file, progress, grid); !result.Ok()) {
                     return result;
                   }
-                  if (!made.grid.PrepareBoundary(made.fault) && made.fault.empty())
+                  if (made.grid.PrepareBoundary(made.fault)) return FileResult();
+                  if (made.fault.empty())
                     made.fault = "The cells of the outer boundary make no closed line around the model";
+                  if (const std::string advice = HowToClose(grid); !advice.empty()) made.fault += "\n" + advice;
                   return FileResult();
                 })};
   return trace_.traced;

@@ -5,6 +5,7 @@
 #include <gmock/gmock.h>
 
 #include "platform/item_types.h"
+#include "spatial/domain_boundary.h"
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -54,6 +55,27 @@ TEST(Domain, TellsWhatIsWrongWithItsFile) {
     else
       EXPECT_EQ(found, "");
   }
+}
+
+TEST(Domain, ABoundaryThatBeginsInASquareCornerTellsWhichCellToLeaveOut) {
+  constexpr float kOut = kUsualDeleteValue;
+  std::vector<float> rectangle{2, 2, 2, 2, 2, 1, 1, 2, 2, 1, 1, 2, 2, 2, 2, 2};
+  const auto trace = [](const std::vector<float>& cells) {
+    test::TempFolder folder;
+    test::WriteGrid(folder.File("domain.nds2"), {4, 4, 100, 0, 0, 0, "NON-UTM"}, cells, quantity::kCode);
+    CFlowModelDoc document;
+    auto& domain = *document.Root().Important(kDomain);
+    domain.GridFile().Choose(FileName("domain.nds2", folder.Path()));
+    const auto traced = domain.Traced();
+    traced->Run();
+    return traced->Result() ? traced->Result()->fault : traced->Problem();
+  };
+  EXPECT_THAT(trace(rectangle), testing::StartsWith("Invalid nds2 file for Model Domain.\n"));
+  EXPECT_THAT(trace(rectangle), HasSubstr("column 1, row 4 from the south"));
+  rectangle[12] = kOut;
+  EXPECT_EQ(trace(rectangle), "");
+  // Where one cell is not all that is wrong, nothing is advised.
+  EXPECT_THAT(trace({2, 2, 2, 2, 2, 1, 1, 2, 2, 1, 1, 2, 2, kOut, 2, 2}), testing::Not(HasSubstr("Leave this cell")));
 }
 
 TEST(Domain, AChosenShapeFilePutsTheGridWhereItLies) {
