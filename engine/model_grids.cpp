@@ -10,6 +10,8 @@
 #include "data/grid_files.h"
 #include "data/grid_resampling.h"
 #include "platform/item_types.h"
+#include "platform/units.h"
+#include "spatial/data2d.h"
 
 namespace tervane {
 
@@ -18,7 +20,18 @@ namespace {
 /// The share of a run that the making of grids takes, in percent.
 constexpr int kBegin = 10, kEnd = 90;
 
-/// The values of a grid on the model's cells, in one plane with it; kDeleteValue where it has none. "" or why not.
+}  // namespace
+
+GridMaker MakeQuantity(const CData2DKvf& quantity, const GridGeometry& model) {
+  return [source = quantity.CurrentSource(), itemType = quantity.GetItemType(), value = quantity.FixedValue,
+          model](CTvn2DOrthoRotatedGridData& grid) -> FileResult {
+    if (source.type != CData2DKvf::kUniform) return BuildGrid(source, {}, grid);
+    const ItemType* type = FindItemType(itemType);
+    const int unit = type ? BaseUnit(*type).key : kDimensionlessUnit;
+    return {grid.SetGridData(model, value, kUsualDeleteValue, unit, itemType), {}};
+  };
+}
+
 std::string PutOnModel(const CTvn2DOrthoRotatedGridData& source, const GridGeometry& model, bool areCodes,
                        std::vector<float>& values) {
   ResamplingTask task;
@@ -33,8 +46,6 @@ std::string PutOnModel(const CTvn2DOrthoRotatedGridData& source, const GridGeome
   };
   return Resample(task, SuitableResampling(task, areCodes), values);
 }
-
-}  // namespace
 
 int ModelGridFile::Add(ModelGrid grid) {
   grids_.push_back(std::move(grid));

@@ -16,13 +16,22 @@
 
 namespace tervane {
 
+class CData2DKvf;
+
+/// Makes values, in the item type's base unit, on any grid in the model's plane.
+using GridMaker = std::function<FileResult(CTvn2DOrthoRotatedGridData&)>;
+/// That of a quantity; a uniform one is made on the model's cells.
+GridMaker MakeQuantity(const CData2DKvf& quantity, const GridGeometry& model);
+/// The values of a grid on the model's cells, in one plane with it; kDeleteValue where it has none. "" or why not.
+std::string PutOnModel(const CTvn2DOrthoRotatedGridData& source, const GridGeometry& model, bool areCodes,
+                       std::vector<float>& values);
+
 /// A quantity that is to be put on the model's cells.
 struct ModelGrid {
   std::string title;
   std::string place;  ///< Path of the node, for messages.
   int itemType = quantity::kUndefined;
-  /// Makes the values, in the item type's base unit, on any grid in the model's plane.
-  std::function<FileResult(CTvn2DOrthoRotatedGridData&)> make;
+  GridMaker make;
   std::function<std::string(int code)> nameOfCode;  ///< Of the zones of a quantity of codes.
   bool mayLeaveCells = false;                       ///< Cells without a value are worth no warning.
 

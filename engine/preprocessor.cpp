@@ -25,6 +25,9 @@
 #include "spatial/domain_boundary.h"
 #include "spatial/stations.h"
 #include "spatial/zones.h"
+#include "subsurface/computational_layers.h"
+#include "subsurface/saturated_zone.h"
+#include "subsurface/wells.h"
 #include "surface/vegetation.h"
 
 namespace tervane {
@@ -107,7 +110,7 @@ Preprocessor::Preprocessor(CFlowModelDoc& document, EngineOutput& log)
 
 bool Preprocessor::Run() {
   log_.Progress(2, "Checking the setup");
-  if (!CheckSetup() || !MakeResultFolder() || !MakeDomain()) return false;
+  if (!CheckSetup() || !MakeResultFolder() || !MakeDomain() || !MakeLayers()) return false;
   report_.top.title = std::string(BaseNameOf(document_.PathName()));
   AddPagesBelow(document_.Root(), report_.top);
   if (!grids_.Write(*domain_, log_)) return false;
@@ -155,6 +158,21 @@ bool Preprocessor::MakeDomain() {
   return domain_ != nullptr;
 }
 
+bool Preprocessor::MakeLayers() {
+  auto* zone = document_.Root().Important(kSaturatedZone);
+  if (!zone || !zone->IsDataUsedInSetup()) return true;
+  log_.Progress(5, "Computational layers");
+  if (!layers_.Make(*zone, *domain_, log_)) return false;
+  if (layers_.IsEmpty()) return true;
+  const std::string path = fmt::format("{}/{}.nds3", FolderOf(grids_.Path()), BaseNameOf(grids_.Path()));
+  const FileResult written = layers_.Write(path, *domain_);
+  if (!written.Ok()) log_.Error({}, written.error);
+  report_.lowerLevelFile = path;
+  report_.lowerLevelItem = ModelLayers::kLowerLevels;
+  report_.numberOfLayers = layers_.Count();
+  return written.Ok();
+}
+
 // ---- Pages
 
 void Preprocessor::AddPagesBelow(CYbSEKvfBase& node, ReportPage& parent) {
@@ -174,6 +192,12 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
     ShowDomain(page);
   } else if (dynamic_cast<const RiverFiles*>(&node) || dynamic_cast<const RiverNetworkFile*>(&node)) {
     ShowRiver(node, page);
+  } else if (dynamic_cast<const CSatZoneKvf*>(&node)) {
+    ShowLayers(page);
+  } else if (const auto* layer = dynamic_cast<const CSZVerDiscrLayerKvf*>(&node)) {
+    ShowBoundaries(*layer, page);
+  } else if (const auto* wells = dynamic_cast<const CSZWellKvf*>(&node)) {
+    ShowWells(*wells, page);
   } else if (auto* quantity = dynamic_cast<CData2DKvf*>(&node)) {
     ShowQuantity(*quantity, page);
   } else if (auto* zones = dynamic_cast<CodedZonesKvf*>(&node)) {
@@ -251,19 +275,47 @@ void Preprocessor::ShowDomain(ReportPage& page) {
   }
 }
 
-void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
-  const GridSource source = quantity.CurrentSource();
-  const int itemType = quantity.GetItemType();
-  auto make = [source, itemType, value = quantity.FixedValue,
-               geometry = domain_->Geometry()](CTvn2DOrthoRotatedGridData& grid) -> FileResult {
-    if (source.type == CData2DKvf::kUniform) {
-      const ItemType* type = FindItemType(itemType);
-      const int unit = type ? BaseUnit(*type).key : kDimensionlessUnit;
-      return {grid.SetGridData(geometry, value, kUsualDeleteValue, unit, itemType), {}};
-    }
-    return BuildGrid(source, {}, grid);
+void Preprocessor::ShowLayers(ReportPage& page) {
+  if (layers_.IsEmpty()) return page.ShowText("The setup tells no levels of computational layers.");
+  page.pages.resize(2);
+  page.pages[0].title = "Lower Levels of Computational Layers";
+  page.pages[0].ShowLayers(report_.lowerLevelFile, ModelLayers::kLowerLevels);
+  page.pages[1].title = "Upper Levels of Computational Layers";
+  page.pages[1].ShowLayers(report_.lowerLevelFile, ModelLayers::kUpperLevels);
+}
+
+void Preprocessor::ShowBoundaries(const CSZVerDiscrLayerKvf& layer, ReportPage& page) {
+  ReportPage& child = page.pages.emplace_back();
+  child.title = "Boundary Codes";
+  const auto make = [&layer, domain = domain_](CTvn2DOrthoRotatedGridData& grid) {
+    return BoundaryCodes(layer, *domain, grid);
   };
-  ShowGrid({page.title, PathOf(quantity), itemType, std::move(make), {}, quantity.MayLeaveCells(), {}, {}}, page);
+  ShowGrid({fmt::format("Boundary Codes, {}", layer.GetAbbreviatedTitle()),
+            PathOf(layer),
+            quantity::kCode,
+            make,
+            boundary_code::NameOf,
+            false,
+            {},
+            {}},
+           child);
+}
+
+void Preprocessor::ShowWells(const CSZWellKvf& wells, ReportPage& page) {
+  const std::string path = wells.Filename.IsEmpty() ? std::string() : wells.Filename.Absolute();
+  page.ShowText(WellsOnModel(path, *domain_, layers_, PathOf(wells), log_));
+}
+
+void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
+  ShowGrid({page.title,
+            PathOf(quantity),
+            quantity.GetItemType(),
+            MakeQuantity(quantity, domain_->Geometry()),
+            {},
+            quantity.MayLeaveCells(),
+            {},
+            {}},
+           page);
   if (&quantity != document_.Root().Important(kTopography)) return;
   report_.topographyFile = grids_.Path();
   report_.topographyItem = static_cast<int>(grids_.Grids().size());

@@ -9,6 +9,7 @@
 #include "document/flow_model_document.h"
 #include "engine/engine_output.h"
 #include "engine/model_grids.h"
+#include "engine/model_layers.h"
 #include "engine/report.h"
 #include "geometry/grid.h"
 
@@ -20,6 +21,9 @@ class CData2DKvf;
 class CSimPeriodKvf;
 class CFMData0DFile;
 class CFMSEKvfBase;
+class CSZVerDiscrLayerKvf;
+class CSZWellKvf;
+class CSatZoneKvf;
 class CVegetationKvf;
 class CellValues;
 class CodedZonesKvf;
@@ -42,6 +46,8 @@ class Preprocessor {
   bool CheckSetup();
   bool MakeResultFolder();
   bool MakeDomain();
+  /// The computational layers, where the setup has some, in a file of their own.
+  bool MakeLayers();
 
   /// Adds pages for what is below a node and takes part.
   void AddPagesBelow(CYbSEKvfBase& node, ReportPage& parent);
@@ -55,6 +61,11 @@ class Preprocessor {
   void ShowForcing(C2DStationBasedDataKvf& forcing, ReportPage& page);
   /// The network as lines, which the river model moves the water along.
   void ShowRiver(const CYbSEKvfBase& node, ReportPage& page);
+  /// Where the computational layers begin and end.
+  void ShowLayers(ReportPage& page);
+  /// What holds in the cells of a computational layer.
+  void ShowBoundaries(const CSZVerDiscrLayerKvf& layer, ReportPage& page);
+  void ShowWells(const CSZWellKvf& wells, ReportPage& page);
   void ShowVegetation(CVegetationKvf& vegetation, ReportPage& page);
   /// The constants, both series on pages of their own, or which crop grows when.
   void ShowCourse(const VegetationCourse& course, ReportPage& page);
@@ -73,6 +84,7 @@ class Preprocessor {
   const CSimPeriodKvf* period_;
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> domain_;
   ModelGridFile grids_;
+  ModelLayers layers_;
   Report report_;
 };
 

@@ -56,6 +56,11 @@ void ReportPage::ShowGrid(const std::string& path, int item) {
   keys = {{"Filename", ReportFile{path}}, {"ItemNo", item}};
 }
 
+void ReportPage::ShowLayers(const std::string& path, int item) {
+  kind = report_kind::kLayers;
+  keys = {{"Filename", ReportFile{path}}, {"ItemNo", item}};
+}
+
 void ReportPage::ShowShapes(const std::string& path, int axisUnit) {
   kind = report_kind::kShapes;
   keys = {{"Filename", ReportFile{path}}, {"enuAxisUnit", axisUnit}};
@@ -81,8 +86,12 @@ std::string WriteReport(const std::string& path, const Report& report) {
     kvfEndSection(file);
   }
   kvfAddSection(file, "LowerLevel");
-  // No layers of the saturated zone are made here.
-  kvfPutParam(file, "SZ_Included", 0);
+  kvfPutParam(file, "SZ_Included", report.lowerLevelFile.empty() ? 0 : 1);
+  if (!report.lowerLevelFile.empty()) {
+    kvfPutParamFilename(file, "Filename", RelativePath(report.lowerLevelFile, folder));
+    kvfPutParam(file, "ItemNo", report.lowerLevelItem);
+    kvfPutParam(file, "NumberOfLayers", report.numberOfLayers);
+  }
   kvfEndSection(file);
   kvfAddSection(file, "DetailedTimeseriesOutput");
   kvfPutParam(file, "NumberOfItems", 0);

@@ -18,6 +18,7 @@ namespace report_kind {
 inline constexpr const char* kNothing = "BLANK";
 inline constexpr const char* kSeries = "NDS0_PLOT";
 inline constexpr const char* kGrid = "NDS2_PLOT";
+inline constexpr const char* kLayers = "NDS3_PLOT";
 inline constexpr const char* kText = "TEXT";
 inline constexpr const char* kShapes = "SHAPE_PLOT";
 }  // namespace report_kind
@@ -39,6 +40,7 @@ struct ReportPage {
   /// Lines of text; they may hold line ends.
   void ShowText(const std::string& text);
   void ShowGrid(const std::string& path, int item);
+  void ShowLayers(const std::string& path, int item);
   /// `axisUnit` is that of the coordinates, one of item 100187.
   void ShowShapes(const std::string& path, int axisUnit);
   void ShowSeries(const std::string& path, int item, const CYbDateTime& start, const CYbDateTime& end);
@@ -48,6 +50,8 @@ struct Report {
   ReportPage top;
   std::string topographyFile;  ///< Of the surface that the model uses; empty when the setup has none.
   int topographyItem = 0;
+  std::string lowerLevelFile;  ///< Of the computational layers; empty when the setup has none.
+  int lowerLevelItem = 0, numberOfLayers = 0;
 };
 
 /// Writes the report in one step. "" or why that failed; then an old report stands.

@@ -12,16 +12,9 @@ namespace {
 
 using BoundaryZone = CSZVerDiscrInternalBoundaryPropKvf;
 
-constexpr KeyChoice kBoundaryTypes[] = {{BoundaryZone::kNone, "None"},
-                                        {BoundaryZone::kFixedHead, "Fixed Head"},
-                                        {BoundaryZone::kFixedHeadDrain, "Fixed Head Drain"},
-                                        {BoundaryZone::kHeadControlledFlux, "Head-Controlled Flux (GHB)"},
-                                        {BoundaryZone::kDrain, "(Reserved for future use)"},
-                                        {BoundaryZone::kRiver, "(Reserved for future use)"},
-                                        {BoundaryZone::kInactive, "Inactive Cells"}};
 constexpr const char* kValueLabels[] = {
     "", "Head elevation", "Head elevation", "Controlling head", "Drain elevation", "River stage", ""};
-static_assert(std::size(kValueLabels) == std::size(kBoundaryTypes));
+static_assert(std::size(kValueLabels) == std::size(BoundaryZone::kBoundaryTypes));
 constexpr KeyChoice kLeakages[] = {{BoundaryZone::kConductance, "Total conductance"},
                                    {BoundaryZone::kLeakageCoefficient, "Leakage coefficient"}};
 

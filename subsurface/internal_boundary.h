@@ -34,6 +34,13 @@ class CSZVerDiscrInternalBoundaryPropKvf : public CodedZoneProp, public ValuedBo
     kRiver = 5,
     kInactive = 6
   };
+  static constexpr KeyChoice kBoundaryTypes[] = {{kNone, "None"},
+                                                 {kFixedHead, "Fixed Head"},
+                                                 {kFixedHeadDrain, "Fixed Head Drain"},
+                                                 {kHeadControlledFlux, "Head-Controlled Flux (GHB)"},
+                                                 {kDrain, "(Reserved for future use)"},
+                                                 {kRiver, "(Reserved for future use)"},
+                                                 {kInactive, "Inactive Cells"}};
   enum Leakage : int { kConductance = 0, kLeakageCoefficient = 1 };
 
   int HeadControlLeakage = kConductance;

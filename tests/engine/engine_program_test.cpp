@@ -9,6 +9,7 @@
 #include "core/kvf.h"
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
+#include "engine/model_layers.h"
 #include "execution/execute_flags.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
@@ -17,6 +18,11 @@
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
+#include "subsurface/computational_layers.h"
+#include "subsurface/geology.h"
+#include "subsurface/internal_boundary.h"
+#include "subsurface/saturated_zone.h"
+#include "subsurface/wells.h"
 #include "surface/climate.h"
 #include "surface/irrigation.h"
 #include "surface/land_use.h"
@@ -30,6 +36,7 @@
 namespace tervane {
 namespace {
 
+using testing::Each;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::Not;
@@ -193,6 +200,84 @@ TEST_F(EngineProgram, TakesTheMeanOfTheStepsOfTheSimulation) {
   ASSERT_EQ(Run("/PP"), kEngineDone) << log;
   EXPECT_FLOAT_EQ(Values(3)[0], (50 + 33) / 2.0F);
   EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("mean of the time steps: 41.5 mm/day everywhere"));
+}
+
+TEST_F(EngineProgram, LeavesLayersBoundariesAndWellsOfTheSaturatedZone) {
+  auto& zone = *document.Root().Important(kSaturatedZone);
+  Topography().FixedValue = 100;
+  zone.Layers().SetItemCount(2, 1);
+  zone.LayersOfGeology().SetItemCount(2, 1);
+  zone.LayersOfGeology().GetItem(1)->Name = "Sand";
+  const auto level = [&](int layer) -> CData2DKvf& { return *PropertyOf(*zone.Layers().GetItem(layer), "LowerLevel"); };
+  level(1).FixedValue = -20;
+  level(1).RelativeToGround = 1;
+  // In its two northern rows the second level lies above the first one.
+  WriteGrid("bottom.nds2", {4, 4, 100, 1000, 2000, 0, {}},
+            {50, 50, 50, 50, 50, 50, 50, 50, 90, 90, 90, 90, 90, 90, 90, 90}, quantity::kElevation);
+  level(2).Type = CData2DKvf::kGridFile;
+  level(2).RelativeToGround = 0;
+  level(2).GridFile().Choose(FileName("bottom.nds2", folder.Path()));
+
+  CGeoDataBoundCondListKvf& outer = zone.LayersOfGeology().GetItem(1)->OuterBoundary();
+  outer.SetItemCount(1, 1);
+  outer.GetItem(1)->BoundaryType = CGeoDataBoundCondItemKvf::kFixedHead;
+  auto& inner = *zone.LayersOfGeology().GetItem(1)->Child<CSZVerDiscrInternalBoundaryKvf>();
+  WriteGrid(
+      "inner.nds2", {4, 4, 100, 1000, 2000, 0, {}},
+      {7, kEmpty, kEmpty, kEmpty, kEmpty, 7, 8, kEmpty, kEmpty, kEmpty, kEmpty, kEmpty, kEmpty, kEmpty, kEmpty, kEmpty},
+      quantity::kCode);
+  inner.Type = ZoneSource::kGridCodes;
+  inner.GridFile().Choose(FileName("inner.nds2", folder.Path()));
+  inner.SyncZones();
+  dynamic_cast<CSZVerDiscrInternalBoundaryPropKvf&>(*inner.SelectZoneByCode(7)).BoundaryType =
+      CSZVerDiscrInternalBoundaryPropKvf::kInactive;
+
+  folder.Write(
+      "a.WEL",
+      "target WEL_CFG {\nsection WELLDATA {\nNoWells = 2\n"
+      "section Well_1 {\nName = \"East\"\nX = 1150.0\nY = 2050.0\nLevel = 100.0\nDepth = 60.0\nNoFilters = 3\n"
+      "section Filter_1 {\nTop = 95.0\nBottom = 85.0\n}\nsection Filter_2 {\nTop = 90.0\nBottom = 60.0\n}\n"
+      "section Filter_3 {\nTop = 45.0\nBottom = 40.0\n}\n}\n"
+      "section Well_2 {\nName = \"Far\"\nX = 1.0\nY = 2.0\nLevel = 100.0\nDepth = 60.0\nNoFilters = 0\n}\n}\n}\n");
+  zone.Wells = 1;
+  document.Root().Important(kWells)->Filename = FileName("a.WEL", folder.Path());
+
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  const auto layers = [&](int item, int layer) {
+    CTvn2DOrthoRotatedGridData grid;
+    EXPECT_EQ(ReadGridData(folder.File("a_results/a_PreProcessed.nds3"), item, grid, {}, {0, layer}).error, "");
+    return grid.Values();
+  };
+  const float none = kEmpty;
+  // Layer 0 is the bottom. What was too thin has the thickness that the setup asks for.
+  EXPECT_THAT(layers(ModelLayers::kLowerLevels, 1), Each(testing::AnyOf(80, none)));
+  EXPECT_THAT(layers(ModelLayers::kLowerLevels, 0),
+              ElementsAre(50, 50, 50, 50, 50, 50, 50, 50, 79.5, 79.5, 79.5, 79.5, none, 79.5, 79.5, none));
+  EXPECT_THAT(layers(ModelLayers::kUpperLevels, 1), Each(testing::AnyOf(100, none)));
+  EXPECT_THAT(layers(ModelLayers::kUpperLevels, 0), Each(testing::AnyOf(80, none)));
+  EXPECT_THAT(log, HasSubstr("6 cells of computational layers were thinner than 0.5 m"));
+  EXPECT_THAT(log, HasSubstr("1 wells lie outside the model, the first is Far"));
+  EXPECT_THAT(log, HasSubstr("1 filters of wells lie in no computational layer, the first is filter 3 of East"));
+
+  const std::string report = test::ReadFile(ReportPath());
+  for (const char* expected :
+       {"NDS3_PLOT", "SZ_Included = 1", "NumberOfLayers = 2",
+        "East, filter 1: column 2, row 1 from the south, layer 1\\\\n",
+        "East, filter 2: column 2, row 1 from the south, layers 1 to 2\\\\n",
+        "filter 3: column 2, row 1 from the south, no", "Boundary Codes, Sand: 0.14 km2", "1, inside: 0.03 km2",
+        "11, outer boundary: Fixed Head: 0.08 km2", "26, internal boundary: Inactive Cells: 0.02 km2",
+        "2, outer boundary without a condition: 0.1 km2"})
+    EXPECT_THAT(report, HasSubstr(expected));
+
+  // Levels that are told by the setup's own layers count in their place; a uniform discretization has none.
+  zone.TypeOfVerDiscr = CSatZoneKvf::kExplicitLevels;
+  zone.OwnLayers().SetItemCount(1, 1);
+  PropertyOf(*zone.OwnLayers().GetItem(1), "LowerLevel")->FixedValue = 10;
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(layers(ModelLayers::kLowerLevels, 0), Each(testing::AnyOf(10, none)));
+  zone.TypeOfVerDiscr = CSatZoneKvf::kUniform;
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(test::ReadFile(ReportPath()), HasSubstr("SZ_Included = 0"));
 }
 
 /// A real catchment with stations, snow and zones.
