@@ -12,6 +12,7 @@
 #include "pages/parts/plot_content.h"
 #include "pages/parts/well_map.h"
 #include "platform/item_types.h"
+#include "spatial/domain.h"
 #include "subsurface/ground_layers.h"
 #include "subsurface/saturated_zone.h"
 
@@ -46,12 +47,14 @@ GroundViews::GroundViews(CYbSEDlgBase& page)
 
 void GroundViews::Describe(PageForm& form) {
   if (!zone_) return;
+  const Condition hasMap = Sentence("the model domain or the ground has a file", [this] { return HasMap(); });
   form.Choice(
           "Map:", [this] { return map_; }, [this](int map) { map_ = map; }, [this] { return MapNames(); })
-      .Hint(kViewOnly);
-  DescribeButtons(form, {});
-  form.Map([this] { return Map(); });
-  DescribeSection(form, {});
+      .Hint(kViewOnly)
+      .ShownWhen(hasMap);
+  DescribeButtons(form, hasMap);
+  form.Map([this] { return Map(); }).ShownWhen(hasMap);
+  DescribeSection(form, hasMap);
 }
 
 void GroundViews::DescribeButtons(PageForm& form, const Condition& isOffered) {
@@ -106,6 +109,15 @@ std::shared_ptr<TableOf<ColumnPart>> GroundViews::ColumnTable() {
 }
 
 // ---- The map
+
+bool GroundViews::HasMap() const {
+  const auto* topography = zone_->Important(kTopography);
+  if (topography && topography->Type != CData2DKvf::kUniform) return true;
+  const auto* domain = zone_->Important(kDomain);
+  if (!domain) return false;
+  return domain->Type == CCatchmentKvf::kShapeFile ? !domain->ShapeFile().File.IsEmpty()
+                                                   : !domain->GridFile().File.IsEmpty();
+}
 
 std::vector<std::string> GroundViews::MapNames() const {
   std::vector<std::string> names{"Ground"};

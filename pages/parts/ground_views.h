@@ -39,6 +39,8 @@ class GroundViews {
 
  private:
   std::shared_ptr<TableOf<ColumnPart>> ColumnTable();
+  /// Something is known that a map can show.
+  bool HasMap() const;
   std::vector<std::string> MapNames() const;
   MapContent Map();
   MapContent ThicknessMap(std::size_t layer);

@@ -11,6 +11,7 @@
 #include "forms/table_form.h"
 #include "platform/item_types.h"
 #include "simspec/model_components.h"
+#include "spatial/domain.h"
 #include "subsurface/geology.h"
 #include "subsurface/saturated_zone.h"
 #include "subsurface/two_layer_soils.h"
@@ -33,6 +34,7 @@ class GroundViewsTest : public testing::Test {
   CGeoLayerSZKvf& layers = *document.Root().Important(kGeologicalLayers);
 
   GroundViewsTest() {
+    document.Root().Important(kDomain)->GridFile().Choose(FileName("domain.nds2", "/setups"));
     document.Root().Important(kTopography)->FixedValue = 100;
     document.Root().Important(kModelComponents)->UZ = 0;
     layers.SetItemCount(2, 1);
@@ -175,6 +177,14 @@ TEST_F(GroundViewsWithSoils, ASectionShowsWhereSoilsEnd) {
   EXPECT_THAT(bottoms(), testing::Each(99.5));
   document.Root().Important(kModelComponents)->UZ = 0;
   EXPECT_THAT(bottoms(), testing::IsEmpty());
+}
+
+TEST_F(GroundViewsTest, WithoutAnythingForAMapThereIsNone) {
+  document.Root().Important(kDomain)->GridFile().Choose(FileName());
+  test::PageDriver page(document, "SaturatedZone/GeoLensesSZ");
+  EXPECT_FALSE(page.Find("Draw Section").IsShown());
+  document.Root().Important(kTopography)->Type = CData2DKvf::kXyzFile;
+  EXPECT_TRUE(page.Find("Draw Section").IsShown());
 }
 
 TEST_F(GroundViewsTest, LevelsOfferBothOnTheirOwnMap) {
