@@ -31,9 +31,9 @@ void OfferImports(CommandOffers& offers) {
 
 /// A file of commands is one row here, in the order of the help.
 constexpr void (*kFiles[])(CommandOffers&) = {
-    OfferFileCommands,  OfferCheckCommand,   OfferTreeCommands,  OfferWhyCommand,  OfferPageCommand,
-    OfferValueCommands, OfferConvertCommand, OfferDiffCommand,   OfferKeysCommand, OfferRunCommand,
-    OfferDataCommands,  OfferImports,        OfferExportCommand, OfferCompletion,
+    OfferFileCommands,   OfferCheckCommand,  OfferTreeCommands,   OfferWhyCommand,    OfferPageCommand,
+    OfferGroundCommands, OfferValueCommands, OfferConvertCommand, OfferDiffCommand,   OfferKeysCommand,
+    OfferRunCommand,     OfferDataCommands,  OfferImports,        OfferExportCommand, OfferCompletion,
 };
 
 /// Quantities whose names contain the typed word, for users who do not know the codes.

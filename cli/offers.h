@@ -49,6 +49,7 @@ void OfferCheckCommand(CommandOffers& offers);
 void OfferTreeCommands(CommandOffers& offers);
 void OfferWhyCommand(CommandOffers& offers);
 void OfferPageCommand(CommandOffers& offers);
+void OfferGroundCommands(CommandOffers& offers);
 void OfferValueCommands(CommandOffers& offers);
 void OfferDiffCommand(CommandOffers& offers);
 void OfferKeysCommand(CommandOffers& offers);

@@ -222,6 +222,37 @@ bool DocumentFrame::GoToPath(const std::string& path) {
   return node && node->GetParent() && GoTo(node->Serial(), parsed.key.name);
 }
 
+bool DocumentFrame::AnswerOnMap(const std::string& answer) {
+  const std::size_t equals = answer.find('=');
+  if (!page_ || equals == std::string::npos) return false;
+  std::vector<MapPoint> points;
+  for (const QString& place : ToQt(answer.substr(equals + 1)).split(' ', Qt::SkipEmptyParts)) {
+    const QStringList numbers = place.split(',');
+    bool isX = false, isY = false;
+    if (numbers.size() == 2) points.push_back({numbers[0].toDouble(&isX), numbers[1].toDouble(&isY)});
+    if (!isX || !isY) return false;
+  }
+  CYbSEDlgBase& page = page_->Page();
+  std::optional<MapRequest> request;
+  bool isPressed = false;
+  page.Form().ForEach([&](Control& control) {
+    if (control.label != answer.substr(0, equals) || !control.press || !control.IsShown()) return;
+    page.Press(control);
+    isPressed = true;
+  });
+  if (!isPressed) return false;
+  page.Form().ForEach([&](Control& control) {
+    if (control.kind == ControlKind::Map && control.IsShown() && !request) request = control.map().request;
+  });
+  const bool isAnswer = request && points.size() >= (request->kind == MapRequest::Kind::Line ? 2U : 1U);
+  if (isAnswer)
+    request->taken(points);
+  else if (request && request->givenUp)
+    request->givenUp();
+  page_->Sync();
+  return isAnswer;
+}
+
 void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
   const PageClass* pageClass = PageClassOf(node);
   PageContext context{session_->Document(), host_,

@@ -34,6 +34,7 @@ using namespace tervane;
 struct Typed {
   std::vector<std::string> files;
   std::string page, size, screenshot, appearance;
+  std::vector<std::string> answers;
   double zoom = 0;
   int delay = -1;
 };
@@ -108,6 +109,12 @@ int Run(const Typed& typed, QApplication& application) {
     std::fprintf(stderr, "quarzel: %s: there is no page of that path\n", typed.page.c_str());
     if (isPicture) return 2;
   }
+  for (const std::string& answer : typed.answers)
+    if (!window.Frame() || !window.Frame()->AnswerOnMap(answer)) {
+      std::fprintf(stderr, "quarzel: %s: the page has no button that asks for these points on its map\n",
+                   answer.c_str());
+      if (isPicture) return 2;
+    }
   if (!isPicture) {
     QTimer::singleShot(0, &window, [&window] { window.OfferRecoveries(); });
     return QApplication::exec();
@@ -141,6 +148,11 @@ int main(int argc, char** argv) {
   Typed typed;
   commandLine.add_option("FILE", typed.files, "Setups (.tvd), libraries (.etv) and data files to open");
   commandLine.add_option("--page", typed.page, "The node to show, as Climate/PrecipitationRate");
+  commandLine
+      .add_option(
+          "--answer", typed.answers,
+          "A button of the page and the points to be taken as clicked on the map, as \"Draw Section=0,0 100,50\"")
+      ->allow_extra_args(false);
   commandLine.add_option("--zoom", typed.zoom, "The size of everything, 1.5 for half as large again")
       ->check(CLI::Range(0.5, 3.0));
   commandLine.add_option("--size", typed.size, "The size of the window, as 1280x800")

@@ -14,6 +14,7 @@
 
 #include <gmock/gmock.h>
 
+#include "shell/charts/section_view.h"
 #include "shell/charts/series_plot.h"
 #include "shell/find_panel.h"
 #include "shell/findings_view.h"
@@ -62,6 +63,18 @@ TEST(DocumentFrame, ANodeThatLeavesTheSetupGivesItsPlaceToTheNearestAbove) {
   setup.Frame().Redo();
   EXPECT_NE(setup.Frame().CurrentPath(), "ModelCompWQ/SimulationPeriodWQ");
   EXPECT_FALSE(setup.Frame().CurrentPath().empty());
+}
+
+TEST(DocumentFrame, AQuestionOnTheMapIsAnsweredWithoutAClick) {
+  OpenedSetup setup(test::Example{"rhone", "rhone.tvd"});
+  setup.GoTo("SaturatedZone");
+  for (const char* refused :
+       {"Draw Section", "Draw Section=1,2", "Draw Section=1;2 3,4", "Draw=1,2 3,4", "Map:=1,2 3,4"})
+    EXPECT_FALSE(setup.Frame().AnswerOnMap(refused)) << refused;
+  EXPECT_TRUE(setup.Frame().AnswerOnMap("Draw Section=367500,5122700 371300,5117000"));
+  const auto* section = setup.Frame().findChild<SectionView*>();
+  ASSERT_TRUE(section);
+  EXPECT_TRUE(QTest::qWaitFor([&] { return section->LayersAt(3000).contains("Moraine"); }));
 }
 
 TEST(DocumentFrame, FindListsPlacesLabelsAndKeysAndLeadsThere) {
