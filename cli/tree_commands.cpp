@@ -9,7 +9,9 @@
 #include "core/kvf_writer.h"
 #include "core/list.h"
 #include "document/key_reference.h"
+#include "pages/why.h"
 #include "platform/text.h"
+#include "wqpt/species_matrix.h"
 
 namespace tervane {
 
@@ -19,7 +21,7 @@ enum class TreeForm { Text, Paths, Json };
 
 struct TreeOptions {
   std::string file, path;
-  bool all = false, paths = false, json = false;
+  bool all = false, paths = false, species = false, json = false;
 };
 
 int TreeCommand(const std::string& file, bool all, TreeForm form, Streams streams) {
@@ -108,6 +110,47 @@ int ShowCommand(const std::string& file, const std::string& typed, bool json, St
   return kDone;
 }
 
+/// Where each species takes part: a block a species, a line for each place that has something of it.
+int SpeciesCommand(const std::string& file, bool json, Streams streams) {
+  CFlowModelDoc document;
+  if (!OpenSetup(document, file, streams)) return kCouldNot;
+  PrintLoadReportHint(document, streams);
+  const SpeciesMatrix matrix = MatrixOfSpecies(document.Root());
+  std::vector<std::string> species, strays;
+  for (const SpeciesRow& row : matrix.rows) {
+    std::vector<std::string> uses;
+    if (!json) fmt::print(streams.out, "{}\n", OneLine(row.name));
+    for (std::size_t place = 0; place < matrix.places.size(); ++place) {
+      const SpeciesUse& use = row.uses[place];
+      if (!use.node) continue;
+      const std::string path = PathOf(*use.node);
+      const std::string text = SpeciesUseText(use);
+      if (!json) {
+        fmt::print(streams.out, "  {}: {}  ({})\n", matrix.places[place], OneLine(text), OneLine(path));
+        if (use.state != SpeciesUse::State::Off) continue;
+        for (const Reason& reason : WhyTakesPart(document, *use.node).reasons)
+          if (!reason.holds) fmt::print(streams.out, "    {}\n", OneLine(reason.text));
+        continue;
+      }
+      std::vector<std::string> names;
+      for (const std::string& name : use.names) names.push_back(JsonQuoted(name));
+      uses.push_back(JsonObject({{"place", JsonQuoted(matrix.places[place])},
+                                 {"state", JsonQuoted(text.substr(0, text.find(':')))},
+                                 {"by", names.empty() ? "" : JsonArray(names)},
+                                 {"path", JsonQuoted(path)}}));
+    }
+    species.push_back(JsonObject({{"name", JsonQuoted(row.name)}, {"uses", JsonArray(uses)}}));
+  }
+  for (const auto& [name, node] : matrix.withoutSpecies) {
+    if (!json) fmt::print(streams.out, "names no species of the setup: {}\n", OneLine(name));
+    strays.push_back(JsonQuoted(name));
+  }
+  if (json)
+    fmt::print(streams.out, "{}\n",
+               JsonObject({{"species", JsonArray(species)}, {"withoutSpecies", JsonArray(strays)}}));
+  return kDone;
+}
+
 }  // namespace
 
 void OfferTreeCommands(CommandOffers& offers) {
@@ -122,10 +165,12 @@ void OfferTreeCommands(CommandOffers& offers) {
   tree.AddFlag("--json", options->json, "As JSON");
 
   Command show = offers.Offer("show", "Show nodes with their keys, as they would be saved", [offers, options] {
-    return ShowCommand(options->file, options->path, options->json, offers.Output());
+    return options->species ? SpeciesCommand(options->file, options->json, offers.Output())
+                            : ShowCommand(options->file, options->path, options->json, offers.Output());
   });
   AddSetup(show, options->file);
   show.Add("PATH", options->path, "The node; without it the whole setup");
+  show.AddFlag("--species", options->species, "Where each species takes part, and why not");
   show.AddFlag("--json", options->json, "As JSON");
 }
 

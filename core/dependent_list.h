@@ -11,6 +11,7 @@
 
 #include <algorithm>
 #include <string>
+#include <unordered_map>
 #include <utility>
 #include <vector>
 
@@ -39,6 +40,8 @@ class CTvnDependentListBase {
   /// `OnNotify` here, then `Notify` on each listener, in order.
   virtual void Notify(int value, void* object);
   virtual void OnNotify(int value, void* object) = 0;
+  /// Cuts all links between a master and this list, which leaves the tree; undoing puts them back.
+  virtual void LeaveMaster() {}
 
  private:
   std::vector<CTvnDependentListBase*> listeners_;
@@ -157,15 +160,8 @@ class CTvnDependentList : public NodeBase, public ListBase {
   CTvnDependentList(std::string title, std::string sectionName, std::string masterName, CYbSEKvfBase* parent)
       : NodeBase(std::move(title), std::move(sectionName), parent), masterName_(std::move(masterName)) {}
 
-  ~CTvnDependentList() override {
-    // No node can be found any more while the whole tree is being destroyed.
-    auto* master = Master();
-    if (!master) return;
-    master->RemoveDependentList(this);
-    ForEachEntry(*dynamic_cast<CYbSEKvfBase*>(master), [this](ItemBase& masterItem) {
-      if (ItemBase* entry = FindDependentItem(masterItem.GetId())) masterItem.RemoveLinkedItem(entry);
-    });
-  }
+  ~CTvnDependentList() override { CutLinks(); }
+  void LeaveMaster() override { CutLinks(); }
 
   ItemBase* CreateDependentItem(int id, const std::string& name) override {
     Entry* entry = this->template NewChild<Entry>(name);
@@ -173,9 +169,17 @@ class CTvnDependentList : public NodeBase, public ListBase {
     return entry;
   }
   ItemBase* FindDependentItem(int id) override {
-    ItemBase* found = nullptr;
-    ForEachEntry(*this, [&](ItemBase& entry) { found = !found && entry.GetId() == id ? &entry : found; });
-    return found;
+    const auto entryAt = [this](std::size_t place) {
+      return place < this->children_.size() ? dynamic_cast<ItemBase*>(this->children_[place].get()) : nullptr;
+    };
+    if (const auto known = places_.find(id); known != places_.end())
+      if (ItemBase* entry = entryAt(known->second); entry && entry->GetId() == id) return entry;
+    // The order has changed, here or by undoing.
+    places_.clear();
+    for (std::size_t place = 0; place < this->children_.size(); ++place)
+      if (const ItemBase* entry = entryAt(place)) places_.emplace(entry->GetId(), place);
+    const auto found = places_.find(id);
+    return found == places_.end() ? nullptr : entryAt(found->second);
   }
   void RemoveDependentItem(ItemBase* item) override { this->RemoveChild(dynamic_cast<CYbSEKvfBase*>(item)); }
 
@@ -200,7 +204,18 @@ class CTvnDependentList : public NodeBase, public ListBase {
       if (auto* entry = dynamic_cast<ItemBase*>(child)) visit(*entry);
   }
 
+  void CutLinks() {
+    // No node can be found any more while the whole tree is being destroyed.
+    auto* master = Master();
+    if (!master) return;
+    master->RemoveDependentList(this);
+    ForEachEntry(*dynamic_cast<CYbSEKvfBase*>(master), [this](ItemBase& masterItem) {
+      if (ItemBase* entry = FindDependentItem(masterItem.GetId())) masterItem.RemoveLinkedItem(entry);
+    });
+  }
+
   std::string masterName_;
+  std::unordered_map<int, std::size_t> places_;  ///< Of the entries among the children by identity; checked before use.
 };
 
 /// A new identity for a master entry, unique in the process.
@@ -219,8 +234,9 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
   CTvnMasterList(std::string title, std::string sectionName, std::string baseName, CYbSEKvfBase* parent)
       : Nodes(std::move(title), std::move(sectionName), parent), baseName_(std::move(baseName)) {}
 
-  std::unique_ptr<Item> NewItem() override {
-    auto item = Nodes::NewItem();
+  /// An item of the list, which a sample of one is not.
+  std::unique_ptr<CYbSEKvfBase> NewItemNode() override {
+    auto item = this->NewItem();
     item->SetId(NewEntryId());
     ++nameCounter_;
     return item;
@@ -297,9 +313,14 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
   // A master list depends on no other list.
   ItemBase* CreateDependentItem(int /*id*/, const std::string& /*name*/) override { return nullptr; }
   ItemBase* FindDependentItem(int id) override {
+    if (const auto known = numbers_.find(id); known != numbers_.end())
+      if (Item* item = this->GetItem(known->second); item && item->GetId() == id) return item;
+    // The order has changed, here or by undoing.
+    numbers_.clear();
     for (int number = 1; number <= this->GetItemCount(); ++number)
-      if (this->GetItem(number)->GetId() == id) return this->GetItem(number);
-    return nullptr;
+      numbers_.emplace(this->GetItem(number)->GetId(), number);
+    const auto found = numbers_.find(id);
+    return found == numbers_.end() ? nullptr : this->GetItem(found->second);
   }
   void RemoveDependentItem(ItemBase* /*item*/) override {}
 
@@ -350,6 +371,7 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
   }
 
   std::string baseName_;
+  std::unordered_map<int, int> numbers_;  ///< Of the items by identity; checked before use.
   int nameCounter_ = 0;
   int nameOffset_ = 0;
 };

@@ -110,6 +110,49 @@ void KeyExchange::Several(std::string_view key, std::vector<Value>& values) {
 template void KeyExchange::Several(std::string_view key, std::vector<int>& values);
 template void KeyExchange::Several(std::string_view key, std::vector<std::string>& values);
 
+void KeyExchange::Lines(std::string_view countKey, std::string_view key, std::vector<KeyLine>& lines) {
+  if (report_) return Finish();
+  if (IsReading()) {
+    int count = 0;
+    if (!kvfGetParam(section_, countKey, &count, 1, 1)) return;
+    lines.clear();
+    KeyLine line;
+    for (int n = 1; n <= count; ++n) {
+      if (!kvfGetListParam(section_, key, n, "sii", &line.text, &line.first, &line.second)) break;
+      lines.push_back(line);
+    }
+    return;
+  }
+  kvfPutParam(file_, countKey, static_cast<int>(lines.size()));
+  for (const KeyLine& line : lines) kvfPutListParam(file_, key, "sii", line.text.c_str(), line.first, line.second);
+  if (!keys_) return;
+  Describe({countKey}, "int", nullptr);
+  Describe({key}, "string, int, int", nullptr);
+}
+
+template <class Value>
+void KeyExchange::Repeated(const RepeatedKeys& names, std::vector<Value>& values) {
+  if (report_) return Finish();
+  if (state_) return void(ExchangeState({names.key}, values));
+  if (IsReading()) {
+    KvfNode* section = kvfSectionByNameNum(section_, names.section, 1);
+    if (!section) return;
+    kvfMarkKnown(section, names.count);
+    values.clear();
+    Value value{};
+    for (int n = 1; kvfGetParam(section, names.key, &value, n, 1); ++n) values.push_back(value);
+    return;
+  }
+  kvfAddSection(file_, names.section);
+  kvfPutParam(file_, names.count, static_cast<int>(values.size()));
+  for (const Value& value : values) kvfPutParam(file_, names.key, value);
+  kvfEndSection(file_);
+  if (keys_) Describe({names.key}, std::is_same_v<Value, int> ? "int list" : "string list", &values);
+}
+
+template void KeyExchange::Repeated(const RepeatedKeys& names, std::vector<int>& values);
+template void KeyExchange::Repeated(const RepeatedKeys& names, std::vector<std::string>& values);
+
 void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
   if (report_) return Finish();
   if (state_) return void(ExchangeState({key}, value));

@@ -81,6 +81,19 @@ class DeclaredKey {
   const void** member_ = nullptr;
 };
 
+/// A text with two whole numbers behind it.
+struct KeyLine {
+  std::string text;
+  int first = 0, second = 0;
+};
+
+/// The names of values that stand one behind the other in a section of their own; constants.
+struct RepeatedKeys {
+  std::string_view section;
+  std::string_view count;
+  std::string_view key;
+};
+
 /// One walk over the keys of a node. A node declares its keys once, in `ExchangeKeys`, in the order of the file; the
 /// same declaration reads them, writes them and describes them. The type of the member is the type in the file. An
 /// absent key leaves its member alone.
@@ -163,6 +176,25 @@ class KeyExchange {
   /// All parameters of one keyword, whole numbers or texts. One of another type leaves the values as they were.
   template <class Value>
   void Several(std::string_view key, std::vector<Value>& values);
+  /// A name of a file with whole numbers behind it, which `numbers()` makes for each writing; they are never read.
+  template <class Numbers>
+  DeclaredKey FileWith(std::string_view key, FileName& file, const Numbers& numbers) {
+    Exchange({key}, file);
+    if (IsWriting())
+      for (const int number : numbers()) kvfAddInt(file_, number);
+    // Asked for, so that they are no unread values.
+    const KvfNode* keyword = section_ ? kvfKeywordByNameNum(section_, key, 1) : nullptr;
+    for (int place = 2, number = 0; keyword && place <= static_cast<int>(keyword->count); ++place)
+      kvfGetParam(section_, key, &number, 1, place);
+    return Declared();
+  }
+  /// Lines one behind the other, each under the same key, and their number in front of them. Without the number nothing
+  /// is read.
+  void Lines(std::string_view countKey, std::string_view key, std::vector<KeyLine>& lines);
+  /// A section of its own, which holds values one behind the other, each under the same key, and their number. The
+  /// number is never read; an absent section leaves the values alone.
+  template <class Value>
+  void Repeated(const RepeatedKeys& names, std::vector<Value>& values);
   /// The date alone: year, month, day.
   void Day(std::string_view key, CYbDateTime& value);
   /// The number of items of a list; reading resizes it.

@@ -6,6 +6,8 @@
 
 #include <fmt/format.h>
 
+#include "core/dependent_list.h"
+
 namespace tervane {
 
 namespace {
@@ -16,6 +18,12 @@ int SectionsIn(const KvfNode* node) {
   for (const KvfNode* child = section ? section->firstChild : nullptr; child; child = child->next)
     count += !child->IsKeyword();
   return count;
+}
+
+/// Nothing follows a master any more at an item that is given up; a step of undo may keep it alive.
+void LeaveMasters(CYbSEKvfBase& item) {
+  if (auto* list = dynamic_cast<CTvnDependentListBase*>(&item)) list->LeaveMaster();
+  for (CYbSEKvfBase* child = item.GetFirstChild(); child; child = item.GetNextChild(child)) LeaveMasters(*child);
 }
 
 }  // namespace
@@ -61,7 +69,10 @@ void CYbSEKvfListBaseInterface::ForwardToItems(int level,
 
 void CYbSEKvfListBaseInterface::SetItemCount(int count, int level) {
   if (level != 1) return ForwardToItems(level, [count](auto& list, int below) { list.SetItemCount(count, below); });
-  while (GetItemCount() > std::max(count, 0)) children_.pop_back();
+  while (GetItemCount() > std::max(count, 0)) {
+    LeaveMasters(*children_.back());
+    children_.pop_back();
+  }
   const bool grows = GetItemCount() < count;
   while (GetItemCount() < count) children_.push_back(NewItemNode());
   if (grows && GetHasBeenTouched() == 1) TouchAllChildren();
@@ -70,7 +81,10 @@ void CYbSEKvfListBaseInterface::SetItemCount(int count, int level) {
 
 void CYbSEKvfListBaseInterface::DeleteItem(int number, int level) {
   if (level != 1) return ForwardToItems(level, [number](auto& list, int below) { list.DeleteItem(number, below); });
-  if (CYbSEKvfBase* item = GetItemNode(number)) RemoveChild(item);
+  if (CYbSEKvfBase* item = GetItemNode(number)) {
+    LeaveMasters(*item);
+    RemoveChild(item);
+  }
   for (const auto& [list, listLevel] : syncedLists_) list->DeleteItem(number, listLevel);
 }
 

@@ -10,12 +10,32 @@
 #include "platform/text.h"
 #include "simspec/model_components.h"
 #include "simspec/river_files.h"
+#include "wqpt/kinetra_specification.h"
+#include "wqpt/sources.h"
 
 namespace tervane {
 
 CFlowModelDoc::CFlowModelDoc() : CYbSEDocument(std::make_unique<CGlobal>()) { Root().Validate(); }
 
-void CFlowModelDoc::OnLoaded() { Root().Validate(); }
+void CFlowModelDoc::OnLoaded() {
+  // The mass of that version was another quantity.
+  constexpr int kVersionOfOtherMass = 10;
+  const auto* quality = Root().Important(kWaterQualityComponents);
+  if (Global().ReadDocVersion() == kVersionOfOtherMass && ModelCompOf(Root()).WQ && quality && quality->OL)
+    AddToReport(LoadReport::Kind::Warning,
+                "You have opened a Release 2007 tvd file\r\nwith Water Quality included for the Overland "
+                "component.\r\nPlease check that the Initial Overland Mass is correct.");
+  if (const auto* sources = Root().Important(kSources))
+    for (int number = 1; number <= sources->GetItemCount(); ++number) sources->GetItem(number)->UpdateStrength();
+  if (auto* templates = Root().Important(kKinetraSpecification)) {
+    for (const CYbSEKvfBase* child = templates->GetFirstChild(); child; child = templates->GetNextChild(child))
+      if (const auto* bindings = dynamic_cast<const CKinetraCompSpecKvf*>(child))
+        if (!bindings->ReadingMessage().empty()) AddToReport(LoadReport::Kind::Warning, bindings->ReadingMessage());
+    for (const std::string& added : templates->RefreshTemplates())
+      AddToReport(LoadReport::Kind::Note, fmt::format("added, since a process template declares it: {}", added));
+  }
+  Root().Validate();
+}
 
 // ---- Saving
 

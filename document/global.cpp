@@ -28,6 +28,10 @@
 #include "surface/land_use.h"
 #include "surface/overland.h"
 #include "surface/rivers.h"
+#include "wqpt/extractions.h"
+#include "wqpt/kinetra_specification.h"
+#include "wqpt/processes.h"
+#include "wqpt/sources.h"
 
 namespace tervane {
 
@@ -69,6 +73,9 @@ constexpr std::array kChildren{
     Child<CBasicParaKvf>(kBasicParameters),
     Child<CModelCompWQKvf>(kWaterQualityComponents),
     Child<CModelCompPTKvf>(kParticleTrackingComponents),
+    Child<CKinetraSpecKvf>(kKinetraSpecification),
+    Child<CSpeciesListKvf>(kSpecies),
+    Child<CProcessesWQKvf>(kProcesses),
     Child<CCatchmentKvf>(kDomain),
     Child<CSubcatchmentKvf>(kSubcatchments),
     ChildRow{MakeBy<NewTopography>, kTopography.text},
@@ -83,9 +90,11 @@ constexpr std::array kChildren{
     Child<CSatZoneKvf>(kSaturatedZone),
     Child<CSatZoneSubCatchmentKvf>(kReservoirZone),
     ChildRow{MakeBy<NewGroundwaterTable>, {}},
+    Child<CSourcesWQListKvf>(kSources),
     Child<CExtraParamsKvf>(),
     Child<CExecuteEngineFlagsKvf>(kExecuteFlags),
     Child<CProcDataKvf>(kProcessedData),
+    Child<CResultsPostProcessingKvf>(kPostProcessing),
     Child<COverviewKvf>(kOverview),
     Child<CCoverageKvf>(kCoverage),
 };
@@ -95,7 +104,7 @@ constexpr std::array kChildren{
 // species and processes are known.
 
 /// Read behind all others, in this order: species must stand before everything that keeps a list per species.
-constexpr std::array<std::string_view, 3> kReadBehind{"SPECIES_LIST", "PROCESSESWQ", kOverland.text};
+constexpr std::array<std::string_view, 3> kReadBehind{kSpecies.text, kProcesses.text, kOverland.text};
 /// In files of version 1 read by the basic parameters, inside their section.
 constexpr std::string_view kStoringResults = "STORINGRESULTS";
 /// Setups of older versions keep the paved areas here, which now belong to overland flow.

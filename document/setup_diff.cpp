@@ -19,6 +19,12 @@ constexpr std::array<std::string_view, 3> kComputed{"Touched", "IsDataUsedInSetu
 
 bool IsComputed(std::string_view key) { return std::find(kComputed.begin(), kComputed.end(), key) != kComputed.end(); }
 
+/// The values as they are compared: numbers behind the name of a file are made at each save.
+std::string ComparedText(const KvfNode& keyword) {
+  const bool isFile = keyword.count > 0 && keyword.params[0].type == KvfType::Filename;
+  return isFile ? KvfValueText(keyword.params[0]) : KvfValuesText(keyword);
+}
+
 /// Nodes of one kind, with the instance number of each among those of its name.
 struct NumberedNode {
   KvfNode* node;
@@ -92,9 +98,9 @@ class Comparison {
     };
     for (const NumberedNode& key : ChildrenOf(to, true)) {
       if (IsComputed(key.node->Name())) continue;
-      const std::string value = KvfValuesText(*key.node);
+      const std::string value = ComparedText(*key.node);
       const KvfNode* old = FindKvfNode(from, true, key.node->Name(), static_cast<std::size_t>(key.instance));
-      const std::string oldValue = old ? KvfValuesText(*old) : std::string();
+      const std::string oldValue = old ? ComparedText(*old) : std::string();
       if (old && oldValue == value) continue;
       result.push_back({old ? SetupDifference::Kind::Changed : SetupDifference::Kind::Added, path, key.Name(), oldValue,
                         value, old && isDefault(key, oldValue), isDefault(key, value),
@@ -104,7 +110,7 @@ class Comparison {
       if (IsComputed(key.node->Name()) ||
           FindKvfNode(to, true, key.node->Name(), static_cast<std::size_t>(key.instance)))
         continue;
-      const std::string value = KvfValuesText(*key.node);
+      const std::string value = ComparedText(*key.node);
       result.push_back({SetupDifference::Kind::Removed,
                         path,
                         key.Name(),

@@ -9,6 +9,7 @@
 #include <variant>
 #include <vector>
 
+#include "core/key_facts.h"
 #include "forms/entry.h"
 
 namespace tervane {
@@ -59,6 +60,13 @@ class CellChoices : public std::vector<CellChoice> {
     for (const char* text : texts) emplace_back(static_cast<int>(size()), text);
   }
   CellChoices(std::initializer_list<CellChoice> entries) : vector(entries) {}
+  /// Those of a key that pages offer.
+  static CellChoices Of(KeyChoices keyChoices) {
+    CellChoices choices;
+    for (const KeyChoice& choice : keyChoices)
+      if (choice.isOffered) choices.emplace_back(choice.value, std::string(choice.text));
+    return choices;
+  }
   /// Texts that are stored as they are.
   static CellChoices Texts(const std::vector<std::string>& texts) {
     CellChoices choices;

@@ -17,8 +17,7 @@ void TableColumn::Bind(const BoundKeys::Place& place) {
   key = place.key;
   unit = place.facts.unit;
   itemType = place.facts.itemType;
-  for (const KeyChoice& choice : place.facts.choices)
-    if (choice.isOffered) choices.emplace_back(choice.value, std::string(choice.text));
+  choices = CellChoices::Of(place.facts.choices);
 }
 
 TableColumn& TableForm::AddColumn(std::string head) {

@@ -11,6 +11,7 @@
 #include "pages/spatial/domain_pages.h"
 #include "pages/spatial/station_pages.h"
 #include "pages/spatial/zone_pages.h"
+#include "pages/species_pages.h"
 #include "pages/subsurface/computational_layer_pages.h"
 #include "pages/subsurface/drainage_pages.h"
 #include "pages/subsurface/geology_pages.h"
@@ -28,6 +29,11 @@
 #include "pages/surface/river_pages.h"
 #include "pages/surface/vegetation_pages.h"
 #include "pages/whole_pages.h"
+#include "pages/wqpt/kinetra_pages.h"
+#include "pages/wqpt/particle_pages.h"
+#include "pages/wqpt/process_pages.h"
+#include "pages/wqpt/source_pages.h"
+#include "pages/wqpt/water_quality_layer_pages.h"
 
 namespace tervane {
 
@@ -64,6 +70,12 @@ constexpr PageFile kFiles[] = {
     {"subsurface", WellPages},
     {"subsurface", ReservoirPages},
     {"subsurface", InternalBoundaryPages},
+    {"wqpt", SpeciesPages},
+    {"wqpt", ProcessPages},
+    {"wqpt", WaterQualityLayerPages},
+    {"wqpt", SourcePages},
+    {"wqpt", KinetraPages},
+    {"wqpt", ParticlePages},
     {"execution", ProcessedPages},
 };
 

@@ -10,6 +10,7 @@ namespace tervane {
 
 inline constexpr PageClass kCatchmentPage{"CCatchmentDlg", 16458};
 inline constexpr PageClass kData2DPage{"CData2DDlg", 16474};
+inline constexpr PageClass kSoilLayersPage{"CUnSatInitConditionLayerListDlg", 0};
 inline constexpr PageClass kStationBasedDataPage{"C2DStationBasedDataDlg", 16538};
 inline constexpr PageClass kStationPage{"C2DStationBaseDataTimeSeriesDlg", 16540};
 inline constexpr PageClass kSubcatchmentPage{"CSubcatchmentDlg", 16619};

@@ -92,6 +92,16 @@ void C2DStationBasedDataKvf::ExchangeKeys(KeyExchange& keys) {
   if (HasElevation()) keys("Elevation", Elevation).Quantity(quantity::kElevation);
 }
 
+void C2DStationBasedDataKvf::SetItemTypes(const std::vector<int>& itemTypes, const std::vector<int>& valueTypes) {
+  kind_.itemTypes = itemTypes;
+  kind_.valueTypes = valueTypes;
+  global_->SeriesFile().SetMultiItemTypes(itemTypes);
+  fully_->GridFile().SetItemType(GetItemType());
+  for (CFMSEKvfGroupBase* item : ZoneItems(*this))
+    if (auto* station = dynamic_cast<C2DStationBasedDataTimeSeriesKvf*>(item))
+      station->SeriesFile().SetMultiItemTypes(itemTypes);
+}
+
 std::shared_ptr<CFMSEKvfGroupBase> C2DStationBasedDataKvf::CreateStationItem() {
   return std::make_shared<C2DStationBasedDataTimeSeriesKvf>(kind_, this);
 }

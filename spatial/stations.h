@@ -110,6 +110,9 @@ class C2DStationBasedDataKvf : public StationOwnerKvf, public ForcingNode {
   float Elevation = 0;  ///< Of the uniform series, quantity 100180; only where the kind has elevations.
 
   const ForcingKind& Kind() const { return kind_; }
+  /// What the files may hold from now on, and of which value types new ones are; the first item type is that of typed
+  /// values.
+  void SetItemTypes(const std::vector<int>& itemTypes, const std::vector<int>& valueTypes);
   int GetItemType() const { return kind_.itemTypes.front(); }
   bool HasElevation() const { return !kind_.correctable.empty(); }
   /// Whether the setup corrects the forcing for elevation.

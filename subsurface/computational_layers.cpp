@@ -11,6 +11,8 @@
 #include "subsurface/internal_boundary.h"
 #include "subsurface/pages.h"
 #include "subsurface/saturated_zone.h"
+#include "wqpt/registration_lenses.h"
+#include "wqpt/species_entries.h"
 
 namespace tervane {
 
@@ -61,6 +63,9 @@ void CSZVerDiscrLayerKvf::MakeConditions() {
   outerBoundary_ = NewChild<CGeoDataBoundCondListKvf>();
   MakeProperties(*this, kOfModflow, false);
   NewChild<CSZVerDiscrInternalBoundaryKvf>();
+  NewChild<CSatCompLayersInitConcentrationKvf>();
+  NewChild<CSatCompLayersInitImmobileConcentrationKvf>();
+  MakeParticleValues(*this);
 }
 
 // ---- Layers that follow the geological layers

@@ -14,7 +14,6 @@ inline constexpr PageClass kSoilProfilePage{"CUZSoilProfilePropDlg", 0};
 inline constexpr PageClass kTwoLayerSoilsPage{"CUZWetlandSoilProfileDlg", 0};
 inline constexpr PageClass kTwoLayerSoilPage{"CUZWetlandSoilPropDlg", 0};
 inline constexpr PageClass kGroundwaterDepthsPage{"CUZGroundWaterDepthListDlg", 0};
-inline constexpr PageClass kUnsaturatedInitialConditionPage{"CUnSatInitConditionLayerListDlg", 0};
 inline constexpr PageClass kSaturatedZonePage{"CSatZoneDlg", 0};
 inline constexpr PageClass kGeologicalUnitsPage{"CGeoUnitsSZListDlg", 0};
 inline constexpr PageClass kGeologicalLayersPage{"CGeoLayerSZDlg", 0};

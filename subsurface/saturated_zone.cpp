@@ -14,6 +14,8 @@
 #include "subsurface/ground_layers.h"
 #include "subsurface/pages.h"
 #include "subsurface/wells.h"
+#include "wqpt/registration_lenses.h"
+#include "wqpt/water_quality_layers.h"
 
 namespace tervane {
 
@@ -58,8 +60,10 @@ CSatZoneKvf::CSatZoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Saturated Zone", 
   units_ = NewChild<CGeoUnitsSZListKvf>();
   layers_ = NewImportantChild<CGeoLayerSZKvf>(kGeologicalLayers, id);
   NewImportantChild<CGeoLenseSZKvf>(kGeologicalLenses);
+  NewImportantChild<CWQLayerListKvf>(kWaterQualityLayers);
   ownLayers_ = NewChild<CSZVerDiscrLayerListKvf>();
   layersOfGeology_ = NewImportantChild<CSZVerDiscrLayerGeoListKvf>(kComputationalLayersOfGeology);
+  NewImportantChild<CRegLensePTListKvf>(kRegistrationLenses);
   NewImportantChild<CDrainageSZKvf>(kDrainage);
   NewImportantChild<CDrainageMFSZKvf>(kModflowDrains);
   NewImportantChild<CSZWellKvf>(kWells, Wells);

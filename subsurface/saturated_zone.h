@@ -8,6 +8,7 @@
 
 #include "spatial/cell_checks.h"
 #include "spatial/geo_data.h"
+#include "wqpt/ground.h"
 
 namespace tervane {
 
@@ -17,7 +18,10 @@ class CSZVerDiscrLayerGeoListKvf;
 class CSZVerDiscrLayerListKvf;
 
 /// Flags are 0 or 1.
-class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution, public CellChecker {
+class CSatZoneKvf : public CYbSEKvfBase,
+                    public GroundParameterDistribution,
+                    public ImmobileWaterChoice,
+                    public CellChecker {
  public:
   explicit CSatZoneKvf(CYbSEKvfBase* parent);
 
@@ -55,6 +59,7 @@ class CSatZoneKvf : public CYbSEKvfBase, public GroundParameterDistribution, pub
   /// `error`, when their file is not named; the section is complete as far as it goes.
   bool AddWellOverlaySection(KvfFile* file, std::string& error) const;
   const int& TypeOfGeoParaDistribution() const override { return ParameterDistribution; }
+  const int& GetMassTransferToImmobileWater() const override { return MassTransferToImmobileWater; }
 
   /// Two findings of the whole: a domain whose boundary cannot be traced where segments lie on it, and computational
   /// layers that are not as many as the geological layers that they follow.

@@ -8,6 +8,10 @@
 #include "subsurface/soil_profiles.h"
 #include "subsurface/two_layer_soils.h"
 #include "subsurface/unsaturated_initial_conditions.h"
+#include "wqpt/decay_entries.h"
+#include "wqpt/kinetra_values.h"
+#include "wqpt/sorption_entries.h"
+#include "wqpt/species_entries.h"
 
 namespace tervane {
 
@@ -74,6 +78,11 @@ CUnsatzoneKvf::CUnsatzoneKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Unsaturated F
   NewChild<CUZSoilProfileKvf>();
   NewChild<CUZWetlandSoilProfileKvf>();
   etSurfaceDepth_ = NewChild<CData2DKvf>(kEtSurfaceDepth, OwnEngine() && TwoLayerMethod());
+  NewChild<CMacroporeTransferCoeff>();
+  NewChild<CDecayProcessListKvf>();
+  NewChild<CSorptionProcessesKvf>();
+  NewImportantChild<CKinetraConstantsUZKvf>(kKinetraConstantsSoil);
+  NewImportantChild<CKinetraForcingsUZKvf>(kKinetraForcingsSoil);
   NewChild<CUZGroundWaterDepthListKvf>()->TakesPartWhen(isModelled && !TwoLayerMethod() &&
                                                         Is(ClassificationType, {kAutomatic, kPartialAutomatic}));
   NewChild<CUnSatInitConditionsKvf>()->TakesPartWhen(isModelled && !TwoLayerMethod() &&

@@ -5,12 +5,13 @@
 #pragma once
 
 #include "core/list.h"
+#include "wqpt/ground.h"
 
 namespace tervane {
 
 class CData2DKvf;
 
-class CUnsatzoneKvf : public CYbSEKvfBase {
+class CUnsatzoneKvf : public CYbSEKvfBase, public MacroporeChoice {
  public:
   explicit CUnsatzoneKvf(CYbSEKvfBase* parent);
 
@@ -29,6 +30,7 @@ class CUnsatzoneKvf : public CYbSEKvfBase {
   /// Of soils of two layers: how far below ground water still rises to the plants.
   CData2DKvf& EtSurfaceDepth() const { return *etSurfaceDepth_; }
 
+  const int& GetBypass() const override { return Bypass; }
   int ValidateData() override;
 
  protected:

@@ -7,6 +7,9 @@
 #include "simspec/control_parameters.h"
 #include "surface/land_use.h"
 #include "surface/pages.h"
+#include "wqpt/decay_entries.h"
+#include "wqpt/kinetra_values.h"
+#include "wqpt/species_entries.h"
 
 namespace tervane {
 
@@ -173,8 +176,12 @@ COverlandKvf::COverlandKvf(CYbSEKvfBase* parent) : CYbSEKvfBase("Overland Flow",
                        OverlandExchangesWithGround() && OnInParent(&COverlandKvf::OverlandGroundWaterExchangeOption));
   NewChild<CPondedWaterExchangeKvf>();
   NewChild<CData2DKvf>(kSeparatedAreas, Component(&CModelCompKvf::OL) && OnInParent(&COverlandKvf::SeparatedFlowAreas));
+  NewChild<COverlandSpeciesKvf>();
   for (const Data2DKind& kind : kDispersion)
     NewChild<CData2DKvf>(kind, Component(&CModelCompKvf::WQ) && WaterQualityComponent(&CModelCompWQKvf::OL));
+  NewChild<CDecayProcessesKvf>();
+  NewImportantChild<CKinetraConstantsOLKvf>(kKinetraConstantsOverland);
+  NewImportantChild<CKinetraForcingsOLKvf>(kKinetraForcingsOverland);
   NewChild<CData2DKvf>(kPavedFraction, OnInParent(&COverlandKvf::ReducedPavedLeakage) &&
                                            OnInParent(&COverlandKvf::OverlandGroundWaterExchangeOption));
   NewImportantChild<CPondedDrainageKvf>(kPondedDrainage)->TakesPartWhen(OnInParent(&COverlandKvf::Drainage));

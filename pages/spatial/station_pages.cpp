@@ -12,6 +12,7 @@
 #include "spatial/pages.h"
 #include "spatial/stations.h"
 #include "surface/pages.h"
+#include "wqpt/pages.h"
 
 namespace tervane {
 
@@ -158,7 +159,9 @@ std::span<const PageRow> StationPages() {
       PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kPrecipitationPage),
       PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kPotEvapTransPage),
       PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kAirTemperaturePage),
+      PageIs<C2DStationBasedDataDlg, C2DStationBasedDataKvf>(kStrengthPage),
       DescribedBy<DescribeStation>(kStationPage),
+      DescribedBy<DescribeStation>(kStrengthStationPage),
       DescribedBy<DescribeStation>(kPrecipitationStationPage),
       DescribedBy<DescribeStation>(kPotEvapTransStationPage),
       DescribedBy<DescribeStation>(kAirTemperatureStationPage),

@@ -4,6 +4,7 @@
 
 #include "forms/table_of.h"
 #include "simspec/conditions.h"
+#include "spatial/pages.h"
 #include "subsurface/pages.h"
 #include "subsurface/unsaturated_initial_conditions.h"
 #include "subsurface/unsaturated_zone.h"
@@ -67,7 +68,7 @@ std::span<const PageRow> UnsaturatedZonePages() {
   static constexpr PageRow kRows[] = {
       DescribedBy<DescribeUnsaturatedZone>(kUnsaturatedZonePage),
       DescribedBy<DescribeGroundwaterDepths>(kGroundwaterDepthsPage),
-      DescribedBy<DescribeInitialCondition>(kUnsaturatedInitialConditionPage),
+      DescribedBy<DescribeInitialCondition>(kSoilLayersPage),
   };
   return kRows;
 }

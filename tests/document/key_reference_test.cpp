@@ -206,7 +206,9 @@ TEST(KeyReference, ListsEveryKeyThatANewSetupHoldsWithItsDefault) {
     if (name == "Touched" || name == "IsDataUsedInSetup" || name == "YbSEKvfListItemCount" || name == "NoOfParams" ||
         name.find("ZoomDataArea") != name.npos)
       continue;
-    EXPECT_EQ(reference.DefaultOf(path, name), KvfValuesText(*node)) << key;
+    // Numbers behind the name of a file are made at each save.
+    const bool isFile = node->count > 0 && node->params[0].type == KvfType::Filename;
+    EXPECT_EQ(reference.DefaultOf(path, name), isFile ? KvfValueText(node->params[0]) : KvfValuesText(*node)) << key;
   }
   kvfClose(&file);
 }
