@@ -74,7 +74,7 @@ void CSpeciesDlg::DescribeMatrix(PageForm& form) {
     std::ranges::replace(head, ' ', '\n');
     table->Value(head, [place](const SpeciesRow& row) { return SpeciesUseText(row.uses[place]); })
         .Key("Include")
-        .Width(95)
+        .Width(head.find("concentration") == std::string::npos ? 90 : 106)
         .ToolTipOf([this, place](SpeciesRow& row) {
           CYbSEKvfBase* node = row.uses[place].node;
           return node ? WhyTakesPart(Context().document, *node).Text("takes part", "takes no part") : std::string();

@@ -37,8 +37,11 @@ void Add(SpeciesUse& use, CYbSEKvfBase& entry, bool isListUsed) {
   if (use.state == State::Set) return;
   const bool isUsed = isListUsed && entry.IsDlgUsedInSetup();
   const State state = !isUsed ? State::Off : IsAtDefault(entry) ? State::Default : State::Set;
-  if (use.node && state <= use.state) return;
+  // Of two that are off, the one in a list that takes part tells more.
+  const bool tellsMore = state > use.state || (state == use.state && isListUsed && !use.isOfUsedList);
+  if (use.node && !tellsMore) return;
   use.state = state;
+  use.isOfUsedList = isListUsed;
   use.node = &entry;
 }
 

@@ -21,6 +21,7 @@ struct SpeciesUse {
   };
   State state = State::None;
   CYbSEKvfBase* node = nullptr;    ///< The first that stands for the species here; null for `None`.
+  bool isOfUsedList = false;       ///< The list that holds the node takes part.
   std::vector<std::string> names;  ///< Of the processes or sources that name the species.
 };
 /// "", "off", "default", "set", with the names behind it.

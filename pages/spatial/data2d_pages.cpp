@@ -3,6 +3,7 @@
 #include "pages/spatial/data2d_pages.h"
 
 #include "pages/parts/create_dialogs.h"
+#include "pages/parts/decay_rate.h"
 #include "pages/parts/file_controls.h"
 #include "pages/parts/ground_views.h"
 #include "pages/parts/plot_content.h"
@@ -83,6 +84,8 @@ void CData2DDlg::Describe(PageForm& form) {
   } else {
     // Another quantity while the values are relative to ground.
     form.Number("Value", n.FixedValue).QuantityBy([&n] { return n.GetItemType(); }).ShownWhen(isUniform);
+    if (n.Kind().itemType == quantity::kHalfLife)
+      form.Shown("Rate (ln 2 / half life)", [&n] { return DecayRateText(n.FixedValue); }).ShownWhen(isUniform);
   }
   form.DataFile("Filename:", n.GridFile()).Filter(kGridFileFilter).DefaultExtension("nds2").ShownWhen(isGrid);
   form.ShapeFile("Filename:", n.ShapeFile()).Filter(kShapeFileFilter).DefaultExtension("shp").ShownWhen(isShape);

@@ -3,6 +3,7 @@
 #include "pages/subsurface/unsaturated_zone_pages.h"
 
 #include "forms/table_of.h"
+#include "pages/parts/decay_rate.h"
 #include "simspec/conditions.h"
 #include "spatial/pages.h"
 #include "subsurface/pages.h"
@@ -52,6 +53,9 @@ void DescribeInitialCondition(PageForm& form, CUnSatInitConditionLayerListKvf& n
   using Item = CUnSatInitConditionLayerItemKvf;
   form.Choice("Spatial Distribution:", n.DistributionType).Hint(kTreeRebuilt | kDataChanged).Revalidates();
   form.Number("Static", n.Distribution_UniformValue).ShownWhen(Is(n.DistributionType, List::kUniform));
+  if (n.GetItemType() == quantity::kHalfLife)
+    form.Shown("Rate (ln 2 / half life)", [&n] { return DecayRateText(n.Distribution_UniformValue); })
+        .ShownWhen(Is(n.DistributionType, List::kUniform));
   auto table = std::make_shared<TableOf<Item>>(n);
   table->ItemName("Layer");
   table->Value("Name", &Item::Name).Width(180).Hint(kTreeRebuilt | kDataChanged);

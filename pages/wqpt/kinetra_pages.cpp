@@ -122,6 +122,13 @@ CellChoices UnitChoicesOf(int dataType) {
   return choices;
 }
 
+/// What is shown of a code: nothing while it is unbound, the number where no entry has it.
+std::string ShownOf(const CellChoices& choices, int code) {
+  const int place = choices.IndexOf(std::to_string(code));
+  if (place >= 0) return choices[static_cast<std::size_t>(place)].text;
+  return code == -1 ? std::string() : std::to_string(code);
+}
+
 void DescribeBindings(PageForm& form, CKinetraCompSpecKvf& n) {
   auto table = std::make_shared<TableOf<KinetraBinding>>(std::make_shared<BindingRows>(n));
   const auto isOfUser = [](KinetraBinding& binding) { return !binding.item->IsModelParameter(); };
@@ -145,6 +152,7 @@ void DescribeBindings(PageForm& form, CKinetraCompSpecKvf& n) {
           [&n](KinetraBinding&) { return ParameterChoices(n); })
       .Key(key)
       .Width(230)
+      .ShownAs([&n](KinetraBinding& binding) { return ShownOf(ParameterChoices(n), binding.dataType); })
       .GreyWhen(isOfUser);
   table
       ->Choice(
@@ -153,6 +161,7 @@ void DescribeBindings(PageForm& form, CKinetraCompSpecKvf& n) {
           [](KinetraBinding& binding) { return UnitChoicesOf(binding.dataType); })
       .Key(key)
       .Width(150)
+      .ShownAs([](KinetraBinding& binding) { return ShownOf(UnitChoicesOf(binding.dataType), binding.unit); })
       .GreyWhen(isOfUser);
   form.Table(table);
 }

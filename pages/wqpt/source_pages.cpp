@@ -13,6 +13,13 @@ namespace tervane {
 
 namespace {
 
+CellChoices TypesAt(CSourceWQItemKvf& source) {
+  CellChoices choices;
+  for (const SourceType& type : SourceTypes())
+    if (type.location == source.Location) choices.emplace_back(type.code, std::string(type.text));
+  return choices;
+}
+
 void DescribeSources(PageForm& form, CSourcesWQListKvf& n) {
   using Source = CSourceWQItemKvf;
   constexpr int kRowsChange = kTreeRebuilt | kDataChanged;
@@ -31,15 +38,15 @@ void DescribeSources(PageForm& form, CSourcesWQListKvf& n) {
   table
       ->Choice(
           "Source\nType", [](const Source& source) { return source.Type; },
-          [](Source& source, int code) { source.SetSourceType(code); },
-          [](Source& source) {
-            CellChoices choices;
-            for (const SourceType& type : SourceTypes())
-              if (type.location == source.Location) choices.emplace_back(type.code, std::string(type.text));
-            return choices;
-          })
+          [](Source& source, int code) { source.SetSourceType(code); }, TypesAt)
       .Key("SourceType")
       .Width(130)
+      .ShownAs([](Source& source) {
+        // A type of the other location has no text here.
+        const CellChoices types = TypesAt(source);
+        const int place = types.IndexOf(std::to_string(source.Type));
+        return place < 0 ? std::string() : types[static_cast<std::size_t>(place)].text;
+      })
       .Hint(kRowsChange);
   table->Choice("Extent\nType", &Source::ExtentType).Width(110).Hint(kRowsChange);
   form.Table(table);
