@@ -2,6 +2,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "wqpt/kinetra_specification.h"
 
+#include <regex>
+#include <set>
+
 #include <gmock/gmock.h>
 
 #include "core/undo.h"
@@ -84,6 +87,54 @@ TEST_F(Kinetra, ATemplateIsReadDeclarationByDeclaration) {
   ASSERT_EQ(read->Outputs().size(), 2U);
   EXPECT_EQ(read->Outputs()[0]->symbol, "p");
   EXPECT_EQ(ReadKinetraTemplate(path_), read) << "two who name one file share it";
+}
+
+TEST_F(Kinetra, TheTemplateToBeginWithIsWhole) {
+  const std::string path = TERVANE_SOURCE_DIR "/examples/oxygen.kinetra";
+  const auto read = ReadKinetraTemplate(path);
+  ASSERT_EQ(read->problem, "");
+  EXPECT_THAT(read->Oddities(), IsEmpty());
+  EXPECT_THAT(read->Transported(), ElementsAre(0, 1, 2, 3));
+  EXPECT_EQ(read->derivedOutputs.size(), 2U);
+
+  // Each value begins within its range, in a unit that it has; each expression names what is declared ahead of it.
+  std::set<std::string> known = {"MAX", "EXP"};
+  for (const auto* items : {&read->stateVariables, &read->constants, &read->forcings})
+    for (const CKinetraSolverItem& item : *items) {
+      SCOPED_TRACE(item.symbol);
+      known.insert(item.symbol);
+      if (item.minimum > item.maximum) continue;  // No range.
+      EXPECT_GE(item.defaultValue, item.minimum);
+      EXPECT_LE(item.defaultValue, item.maximum);
+      EXPECT_EQ(item.isUserSpecified, item.kind != KinetraItemKind::StateVariable && !item.IsModelParameter());
+    }
+  const std::regex symbol("[A-Za-z][A-Za-z0-9]*|[0-9.]+(E[0-9]+)?");
+  const auto check = [&](const CKinetraSolverItem& item) {
+    SCOPED_TRACE(item.description);
+    EXPECT_NE(item.expression, "");
+    for (auto found = std::sregex_iterator(item.expression.begin(), item.expression.end(), symbol);
+         found != std::sregex_iterator(); ++found)
+      if (std::isalpha(static_cast<unsigned char>(found->str()[0])) != 0) {
+        EXPECT_TRUE(known.contains(found->str())) << found->str();
+      }
+    if (!item.symbol.empty()) known.insert(item.symbol);
+  };
+  for (const auto* items : {&read->auxiliaries, &read->processes, &read->derivedOutputs, &read->stateVariables})
+    std::ranges::for_each(*items, check);
+
+  // It takes from the model what its compartment has.
+  std::filesystem::copy_file(path, folder_.File("whole.kinetra"));
+  path_ = folder_.File("whole.kinetra");
+  QualitySetup setup(
+      Sections("OL") +
+      "section OL_Constants { NumberOfConstants = 1; Constant = \"Altitude\", 1030, 1000; } section OL_Forcings { "
+      "NumberOfForcings = 2; Forcing = \"Temperature\", 2020, 2800; Forcing = \"Depth\", 2040, 1000; } } ");
+  EXPECT_EQ(setup.At<CSpeciesListKvf>("Species").Names(),
+            (std::vector<std::string>{"Oxygen", "Ammonium", "Nitrate", "OrganicMatter"}));
+  EXPECT_THAT(NamesIn(setup, "Overland/KinetraForcings"), ElementsAre("Litter"));
+  EXPECT_THAT(NamesIn(setup, "Overland/KinetraConstants"), testing::SizeIs(read->constants.size() - 1));
+  const auto& spec = setup.At<CKinetraSpecKvf>("KinetraTemplateSpecification");
+  for (const int code : {1030, 2020, 2040}) EXPECT_TRUE(spec.IsBuiltInUsed(code)) << code;
 }
 
 TEST_F(Kinetra, WhatIsNoTemplateIsEmptyAndSaysWhy) {
