@@ -27,6 +27,9 @@ bool IsAtDefault(const CYbSEKvfBase& entry) {
   if (const auto* soil = dynamic_cast<const SoilValuesKvf*>(&entry))
     return soil->DistributionType == SoilValuesKvf::kUniform &&
            SameNumber(soil->Distribution_UniformValue, soil->Kind().uniformValue);
+  if (const auto* forcing = dynamic_cast<const C2DStationBasedDataKvf*>(&entry))
+    return forcing->DistributionType == StationOwnerKvf::kUniform && forcing->Global().TYPE == CGlobalKvf::kConstant &&
+           SameNumber(forcing->Global().FIXED_VALUE, 0);
   for (CYbSEKvfBase* child = entry.GetFirstChild(); child; child = entry.GetNextChild(child))
     if (child->IsDlgUsedInSetup() && !IsAtDefault(*child)) return false;
   return true;
