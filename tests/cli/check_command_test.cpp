@@ -101,6 +101,20 @@ TEST(CheckCommand, TheRhoneIsWhole) {
   }
 }
 
+TEST(CheckCommand, TheRhoneWithQualityAndWithParticlesIsWhole) {
+  for (const char* name : {"rhone_quality.tvd", "rhone_particles.tvd"}) {
+    SCOPED_TRACE(name);
+    const test::CommandOutcome checked = test::Tervane({"check", kFolder + name});
+    EXPECT_EQ(checked.status, kFindings);  // The gauge alone.
+    EXPECT_EQ(std::ranges::count(checked.out, '\n'), 1) << checked.out;
+  }
+  const test::CommandOutcome species = test::Tervane({"show", "--species", kFolder + "rhone_quality.tvd"});
+  for (const char* expected :
+       {"Atrazine\n", "Ground decay: set: Decay of Atrazine", "Ground sorption: set: Sorption of Atrazine",
+        "Sources: set: Fields of the valley", "Sources: set: Salt in the rain", "Overland mass: set  (Overland"})
+    EXPECT_THAT(species.out, testing::HasSubstr(expected));
+}
+
 /// Runs a command; gives its status.
 int Tervane(const std::vector<std::string>& arguments, std::string& out) {
   const test::CommandOutcome outcome = test::Tervane(arguments);

@@ -325,6 +325,15 @@ TEST(EngineProgramExample, ReportsTheRhone) {
   ASSERT_TRUE(rivers.ReadShapeAndDbfFile(folder.File("rhone_results/rhone_PreProcessed_Rivers.shp"), "NAME").Ok());
   EXPECT_EQ(rivers.GetData().size(), 4U);
 
+  for (const auto& [setup, expected] :
+       {std::pair{"rhone_quality", std::vector{"TITLE = \"Chloride\""}},
+        std::pair{"rhone_particles", std::vector{"Initial Number of Particles Per Cell"}}}) {
+    std::ostringstream told;
+    ASSERT_EQ(RunEngineProgram({folder.File(setup + std::string(".tvd")), "/PP"}, told), kEngineDone) << told.str();
+    const std::string made = test::ReadFile(folder.File(fmt::format("{0}_results/{0}_PreProcessed.kvf", setup)));
+    for (const char* text : expected) EXPECT_THAT(made, HasSubstr(text));
+  }
+
   std::ostringstream faults;
   EXPECT_EQ(RunEngineProgram({folder.File("rhone_faults.tvd"), "/PP"}, faults), kEngineFailed);
   for (const char* expected :
