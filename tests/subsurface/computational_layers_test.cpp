@@ -41,7 +41,8 @@ TEST(ComputationalLayers, OneListCountsAtMost) {
 TEST(ComputationalLayers, HoldTheirConditionsInTheOrderOfTheFile) {
   test::TestSetup setup;
   const std::string conditions =
-      "InitPotHead InitialSoilTemperature OuterBoundary HydrHeadUsedForAirFlow WettingThreshold InternalBoundary Initial_Concentration "
+      "InitPotHead InitialSoilTemperature OuterBoundary HydrHeadUsedForAirFlow WettingThreshold InternalBoundary "
+      "Initial_Concentration "
       "Initial_Immobile_Concentration Initial_NumberOfParticles PTRegistrationCodes";
   EXPECT_EQ(Children(setup.At<CYbSEKvfBase>("SaturatedZone/CompLayersGeoSZ/Layer_1")), conditions);
   EXPECT_EQ(Children(setup.At<CYbSEKvfBase>("SaturatedZone/CompLayersSZ/Layer_1")), "LowerLevel " + conditions);
