@@ -2,9 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "cli/command_line.h"
 
+#include <algorithm>
+#include <array>
 #include <new>
 #include <span>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -30,11 +33,38 @@ void OfferImports(CommandOffers& offers) {
 }
 
 /// A file of commands is one row here, in the order of the help.
-constexpr void (*kFiles[])(CommandOffers&) = {
-    OfferFileCommands,   OfferCheckCommand,  OfferTreeCommands,   OfferWhyCommand,    OfferPageCommand,
-    OfferGroundCommands, OfferValueCommands, OfferConvertCommand, OfferDiffCommand,   OfferKeysCommand,
-    OfferRunCommand,     OfferDataCommands,  OfferImports,        OfferExportCommand, OfferCompletion,
+struct CommandFile {
+  void (*offer)(CommandOffers&);
+  /// Its commands, where they are used often and in numbers: a line that begins with one of them is understood without
+  /// the others being offered, which takes as long as to check a small setup.
+  std::array<std::string_view, 2> commands = {};
 };
+constexpr CommandFile kFiles[] = {
+    {OfferFileCommands, {"new"}},
+    {OfferCheckCommand, {"check"}},
+    {OfferTreeCommands, {"tree", "show"}},
+    {OfferWhyCommand, {"why"}},
+    {OfferPageCommand, {"page"}},
+    {OfferGroundCommands},
+    {OfferValueCommands, {"get", "set"}},
+    {OfferConvertCommand, {"convert"}},
+    {OfferDiffCommand, {"diff"}},
+    {OfferKeysCommand},
+    {OfferRunCommand, {"run"}},
+    {OfferDataCommands},
+    {OfferImports},
+    {OfferExportCommand},
+    {OfferCompletion},
+};
+
+/// Offers the commands that the words may mean.
+void OfferCommands(CommandOffers& offers, std::span<const std::string> words) {
+  for (const CommandFile& file : kFiles)
+    if (!words.empty() && !words.front().empty() &&
+        std::ranges::find(file.commands, words.front()) != file.commands.end())
+      return file.offer(offers);
+  for (const CommandFile& file : kFiles) file.offer(offers);
+}
 
 /// Quantities whose names contain the typed word, for users who do not know the codes.
 std::string NearQuantities(const std::string& typed) {
@@ -104,7 +134,7 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& plai
 
   int status = kDone;
   CommandOffers offers(app, {out, err}, status);
-  for (const auto& offer : kFiles) offer(offers);
+  OfferCommands(offers, arguments);
 
   if (const std::string why = WhyNoCommand(app, arguments); !why.empty()) return Refuse({out, err}, why);
   try {
