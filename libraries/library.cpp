@@ -148,8 +148,9 @@ FileResult WriteLibrary(const std::string& path, const Library& library) {
 std::shared_ptr<const LibraryReading> ReadLibraryOnce(const LibraryKind& kind, const std::string& path) {
   static FileCache<LibraryReading> cache(kMostFacts);
   return cache.Get(path, std::string(kind.target), [&] {
-    LibraryReading reading{Library(kind), {}};
+    LibraryReading reading{Library(kind), {}, {}};
     reading.problem = ReadLibrary(path, reading.library);
+    reading.findings = FindingsOf(reading.library);
     return reading;
   });
 }

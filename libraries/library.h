@@ -133,7 +133,8 @@ FileResult WriteLibrary(const std::string& path, const Library& library);
 /// What is at a path.
 struct LibraryReading {
   Library library;
-  std::string problem;  ///< Why there is none; empty when there is.
+  std::string problem;                   ///< Why there is none; empty when there is.
+  std::vector<LibraryFinding> findings;  ///< All that is wrong with it, in the order of the file.
 };
 /// The same, read again only when the file has changed. Any thread may ask.
 std::shared_ptr<const LibraryReading> ReadLibraryOnce(const LibraryKind& kind, const std::string& path);

@@ -13,6 +13,7 @@
 #include "core/kvf_writer.h"
 #include "data/csv_reader.h"
 #include "libraries/kept_text.h"
+#include "platform/file_cache.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 
@@ -103,12 +104,12 @@ std::partial_ordering CTvnWellData::operator<=>(const CTvnWellData& other) const
 }
 
 bool CTvnWellDataList::LoadWellDataFile(const std::string& path) {
-  wells_.clear();
+  static FileCache<std::vector<CTvnWellData>> cache(kMostFacts);
   const auto reading = ReadLibraryOnce(kWellLibrary, path);
   problem_ = reading->problem;
-  if (!problem_.empty()) return false;
-  wells_ = WellsOf(reading->library);
-  return true;
+  wells_ = problem_.empty() ? cache.Get(path, {}, [&] { return WellsOf(reading->library); })
+                            : std::make_shared<const std::vector<CTvnWellData>>();
+  return problem_.empty();
 }
 
 std::vector<CTvnAbstraction> TvnGetAbstractionFileList(const std::string& path) {

@@ -5,6 +5,7 @@
 #pragma once
 
 #include <compare>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -50,11 +51,12 @@ class CTvnWellDataList {
   /// file that has not changed is not read again.
   bool LoadWellDataFile(const std::string& path);
 
-  const std::vector<CTvnWellData>& Wells() const { return wells_; }
+  const std::vector<CTvnWellData>& Wells() const { return *wells_; }
   const std::string& Problem() const { return problem_; }
 
  private:
-  std::vector<CTvnWellData> wells_;
+  /// There may be very many: all lists of a file share them.
+  std::shared_ptr<const std::vector<CTvnWellData>> wells_ = std::make_shared<const std::vector<CTvnWellData>>();
   std::string problem_;
 };
 

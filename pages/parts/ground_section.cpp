@@ -14,11 +14,11 @@
 
 namespace tervane {
 
-std::vector<CTvnWellData> WellsOf(const CSatZoneKvf& zone) {
+CTvnWellDataList WellsOf(const CSatZoneKvf& zone) {
   const auto* wells = zone.Important(kWells);
   CTvnWellDataList list;
   if (zone.Wells && wells && !wells->Filename.IsEmpty()) list.LoadWellDataFile(wells->Filename.Absolute());
-  return list.Wells();
+  return list;
 }
 
 SectionContent SectionOf(const CSatZoneKvf& zone, GroundSoils& soils) {
@@ -46,7 +46,8 @@ SectionContent SectionOf(const CSatZoneKvf& zone, GroundSoils& soils) {
     }
   }
   if (auto bottom = soils.Bottom(section.awaited)) section.curves.push_back(*std::move(bottom));
-  for (const CTvnWellData& well : WellsOf(zone))
+  const CTvnWellDataList wells = WellsOf(zone);
+  for (const CTvnWellData& well : wells.Wells())
     for (const CTvnWellFilter& filter : well.filters)
       section.screens.push_back({well.name, well.place, filter.top, filter.bottom});
   if (const auto* domain = zone.Important(kDomain)) section.screenReach = domain->GetModelGeometry().cellSize;

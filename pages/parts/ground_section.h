@@ -2,8 +2,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <vector>
-
 #include "forms/plots.h"
 #include "libraries/wells.h"
 #include "pages/parts/ground_soils.h"
@@ -15,6 +13,6 @@ class CSatZoneKvf;
 /// What a section through the ground of a setup shows, but for its line.
 SectionContent SectionOf(const CSatZoneKvf& zone, GroundSoils& soils);
 /// The wells of the setup; none where they take no part.
-std::vector<CTvnWellData> WellsOf(const CSatZoneKvf& zone);
+CTvnWellDataList WellsOf(const CSatZoneKvf& zone);
 
 }  // namespace tervane

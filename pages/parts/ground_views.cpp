@@ -83,7 +83,7 @@ void GroundViews::PutOn(MapContent& map) const {
   section_.PutOn(map);
   question_.PutOn(map);
   if (map.IsEmpty()) return;
-  AddWells(map, WellsOf(*zone_));
+  AddWells(map, WellsOf(*zone_).Wells());
   if (place_) map.points.push_back({.points = {*place_}});
 }
 

@@ -27,7 +27,7 @@ std::string WellFaults(const FileName& file) {
   if (file.IsEmpty()) return {};
   const auto reading = ReadLibraryOnce(kWellLibrary, file.Absolute());
   if (!reading->problem.empty()) return reading->problem;
-  const std::vector<LibraryFinding> findings = FindingsOf(reading->library);
+  const std::vector<LibraryFinding>& findings = reading->findings;
   if (findings.empty()) return {};
   std::string text = FindingText(file.Text(), reading->library, findings.front());
   if (findings.size() > 1) text += fmt::format(" ({} more)", findings.size() - 1);
