@@ -52,6 +52,13 @@ KeyExchange KeyExchange::Restoring(StateBuffer& state) {
   return keys;
 }
 
+KeyExchange KeyExchange::Fingerprinting(StateFingerprint& fingerprint) {
+  KeyExchange keys;
+  keys.fingerprint_ = &fingerprint;
+  keys.docVersion_ = KeyInfo::kNoLimit;
+  return keys;
+}
+
 KeyExchange KeyExchange::Checking(StrayReport report) {
   KeyExchange keys;
   keys.report_ = std::move(report);
@@ -63,7 +70,9 @@ void KeyExchange::Finish() {
   if (!report_ || checked_.key.empty()) return;
   if (std::string text = WhyStray(checked_.facts, checked_.value); !text.empty())
     report_(Trimmed(checked_.key), std::move(text), std::isfinite(checked_.value));
-  checked_ = {};
+  checked_.key.clear();
+  checked_.facts = {};
+  checked_.member = nullptr;
 }
 
 bool KeyExchange::Reads(const Rule& rule) {
@@ -87,7 +96,7 @@ void KeyExchange::Describe(const Rule& rule, std::string_view type, const void* 
 template <class Value>
 void KeyExchange::Several(std::string_view key, std::vector<Value>& values) {
   if (report_) return Finish();
-  if (state_) return void(ExchangeState({key}, values));
+  if (state_ || fingerprint_) return void(ExchangeState({key}, values));
   if (IsReading()) {
     const KvfNode* keyword = kvfKeywordByNameNum(section_, key, 1);
     if (!keyword) return;
@@ -133,7 +142,7 @@ void KeyExchange::Lines(std::string_view countKey, std::string_view key, std::ve
 template <class Value>
 void KeyExchange::Repeated(const RepeatedKeys& names, std::vector<Value>& values) {
   if (report_) return Finish();
-  if (state_) return void(ExchangeState({names.key}, values));
+  if (state_ || fingerprint_) return void(ExchangeState({names.key}, values));
   if (IsReading()) {
     KvfNode* section = kvfSectionByNameNum(section_, names.section, 1);
     if (!section) return;
@@ -155,7 +164,7 @@ template void KeyExchange::Repeated(const RepeatedKeys& names, std::vector<std::
 
 void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
   if (report_) return Finish();
-  if (state_) return void(ExchangeState({key}, value));
+  if (state_ || fingerprint_) return void(ExchangeState({key}, value));
   int year = value.Year(), month = value.Month(), day = value.Day();
   if (IsReading()) {
     if (!kvfGetListParam(section_, key, 1, "iii", &year, &month, &day)) return;
@@ -170,7 +179,7 @@ void KeyExchange::Day(std::string_view key, CYbDateTime& value) {
 
 void KeyExchange::Count(std::string_view key, CYbSEKvfListBaseInterface& list) {
   if (report_) return Finish();
-  if (state_) return;
+  if (state_ || fingerprint_) return;
   if (IsReading()) {
     list.ReadItemCount(section_, key);
     return;

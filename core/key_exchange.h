@@ -108,6 +108,8 @@ class KeyExchange {
   /// kept.
   static KeyExchange Keeping(StateBuffer& state);
   static KeyExchange Restoring(StateBuffer& state);
+  /// Makes a number of what would be kept. It may go from node to node.
+  static KeyExchange Fingerprinting(StateFingerprint& fingerprint);
 
   /// Holds every number against what its declaration tells. `report` gets what is wrong, as a sentence; `isNumber` is
   /// false for a value that is no number at all. The walk ends with `Finish`.
@@ -214,7 +216,7 @@ class KeyExchange {
   template <class Value>
   bool Exchange(const Rule& rule, Value& value) {
     if (report_) return Check(rule, value);
-    if (state_) return ExchangeState(rule, value);
+    if (state_ || fingerprint_) return ExchangeState(rule, value);
     if (IsReading()) return Reads(rule) && Read(rule.key, value);
     if (IsWriting() && !rule.written) return false;
     Write(rule.key, value);
@@ -225,6 +227,7 @@ class KeyExchange {
   template <class Value>
   bool ExchangeState(const Rule& rule, Value& value) {
     if (!rule.written || rule.since == KeyInfo::kNoLimit) return false;
+    if (fingerprint_) return fingerprint_->Put(value), false;
     if (!isRestoring_) return state_->Put(value), false;
     state_->Take(value);
     return true;
@@ -243,8 +246,10 @@ class KeyExchange {
   bool Check(const Rule& rule, const Value& value) {
     Finish();
     if constexpr (std::is_same_v<Value, int> || std::is_floating_point_v<Value>) {
-      if (rule.written && rule.since != KeyInfo::kNoLimit)
-        checked_ = {std::string(rule.key), static_cast<double>(value), {}, {}};
+      if (rule.written && rule.since != KeyInfo::kNoLimit) {
+        checked_.key.assign(rule.key);
+        checked_.value = static_cast<double>(value);
+      }
     }
     return false;
   }
@@ -274,6 +279,7 @@ class KeyExchange {
   KvfFile* file_ = nullptr;
   std::vector<KeyInfo>* keys_ = nullptr;
   StateBuffer* state_ = nullptr;
+  StateFingerprint* fingerprint_ = nullptr;
   bool isRestoring_ = false;
   StrayReport report_;
   struct {

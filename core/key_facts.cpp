@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "core/key_facts.h"
 
+#include <algorithm>
 #include <cmath>
 
 #include <fmt/format.h>
@@ -39,12 +40,11 @@ std::string WhyStray(const KeyFacts& facts, double value) {
   const bool isTooSmall = facts.isLeastOutside ? value <= facts.least : value < facts.least - slack;
   if (isTooSmall || value > facts.greatest + slack)
     return fmt::format("The value {} is outside its range: {}.", fmt::format("{:.7g}", value), facts.RangeText());
-  if (facts.choices.empty()) return {};
+  const auto isChosen = [&](const KeyChoice& choice) { return static_cast<double>(choice.value) == value; };
+  if (facts.choices.empty() || std::ranges::any_of(facts.choices, isChosen)) return {};
   std::string texts;
-  for (const KeyChoice& choice : facts.choices) {
-    if (static_cast<double>(choice.value) == value) return {};
+  for (const KeyChoice& choice : facts.choices)
     texts += fmt::format("{}{} ({})", texts.empty() ? "" : ", ", choice.value, choice.text);
-  }
   return fmt::format("The value {} is none of its choices: {}.", fmt::format("{:.7g}", value), texts);
 }
 

@@ -224,20 +224,27 @@ int CYbSEKvfBase::IsDataUsedInSetup() {
   return 1;
 }
 
-int CYbSEKvfBase::Validate() {
+int CYbSEKvfBase::ValidateAs(bool takesPart) {
+  if (!takesPart && isClear_) return valid_;
   findings_.clear();
   valid_ = 1;
   if (!HoldsSetup()) return valid_;
-  if (IsDataUsedInSetup()) {
+  if (takesPart) {
     const bool isValid = ValidateData() != 0;
     CheckValues();
     valid_ = isValid && std::none_of(findings_.begin(), findings_.end(),
                                      [](const Finding& finding) { return finding.severity == Severity::Error; });
   }
-  for (const auto& property : properties_)
-    if (!property->Validate()) valid_ = 0;
-  for (std::size_t place = 0; place < children_.size(); ++place)
-    if (!children_[place]->Validate()) valid_ = 0;
+  isClear_ = findings_.empty();
+  validatesBelow_ = true;
+  const auto validate = [&](CYbSEKvfBase& node) {
+    if (!node.ValidateAs(takesPart && node.IsDlgUsedInSetup())) valid_ = 0;
+    isClear_ = isClear_ && node.isClear_;
+  };
+  for (const auto& property : properties_) validate(*property);
+  for (std::size_t place = 0; place < children_.size(); ++place) validate(*children_[place]);
+  validatesBelow_ = false;
+  isClear_ = isClear_ && valid_;
   return valid_;
 }
 
@@ -294,7 +301,7 @@ void CYbSEKvfGlobalBase::RegisterImportantNode(CYbSEKvfBase* node, std::string_v
 }
 
 CYbSEKvfBase* CYbSEKvfGlobalBase::GetImportantNode(std::string_view name) const {
-  const auto found = importantNodes_.find(std::string(name));
+  const auto found = importantNodes_.find(name);
   return found == importantNodes_.end() ? nullptr : found->second;
 }
 

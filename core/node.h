@@ -180,7 +180,7 @@ class CYbSEKvfBase {
 
   /// Clears and makes the findings of this node and of all below it; nodes that take no part have none. Non-zero when
   /// no error stands.
-  virtual int Validate();
+  int Validate() { return ValidateAs(IsDataUsedInSetup() != 0); }
   /// The node's own checks; 0 when the node is not valid.
   virtual int ValidateData() { return 1; }
   /// Result of the latest validation, also of the nodes below.
@@ -227,17 +227,23 @@ class CYbSEKvfBase {
   /// Place of a child in `children_`, or -1.
   std::ptrdiff_t IndexOfChild(const CYbSEKvfBase* child) const;
   bool MissedSection(const CYbSEKvfBase& child) const { return child.missedSection_; }
+  /// While the node is validated: as one of those below its parent, which was validated just before.
+  bool IsValidatedWithParent() const { return parent_ && parent_->validatesBelow_; }
 
  private:
+  /// Validates, where the nodes above have said whether this one takes part.
+  int ValidateAs(bool takesPart);
   /// Adds the findings for values that their keys do not allow.
   void CheckValues();
   friend class CYbSEKvfGlobalBase;
   friend class UndoStack;
 
+  // What every walk asks stands in front, close together: a walk over many nodes waits for memory more than it works.
+  // What undo compares stands there and at the end, beside the values of the node's class.
+  std::vector<std::shared_ptr<CYbSEKvfBase>> properties_;
   CYbSEKvfBase* parent_;
   CYbSEKvfGlobalBase* root_;
   const std::uint64_t serial_;
-  // What every walk asks stands in front, close together: a walk over many nodes waits for memory more than it works.
   int touched_ = 0;
   int sectionNumber_ = -1;
   int sectionUsed_ = 1;
@@ -246,16 +252,19 @@ class CYbSEKvfBase {
   int valid_ = 1;
   bool missedSection_ = false;  ///< The latest load looked for the section and did not find it.
   bool isImportant_ = false;    ///< Registered at the root at least once.
+  /// The latest validation found nothing here and below: where nothing takes part, nothing is to be cleared.
+  bool isClear_ = true;
+  bool validatesBelow_ = false;
   std::vector<Finding> findings_;
-  std::vector<std::shared_ptr<CYbSEKvfBase>> properties_;
-  std::string sectionName_, title_, abbreviatedTitle_, helpFile_, helpPage_;
   Condition takesPart_;
+  std::string sectionName_, helpFile_, helpPage_;
   std::string_view className_;  ///< Empty where the type tells it.
   struct {
     int lastVersion = -1;
     std::string_view name;
   } oldSection_;  ///< Without a name where the section had always the same.
   const PageClass* setupPage_ = nullptr;
+  std::string title_, abbreviatedTitle_;
 };
 
 /// A node that is meant to hold further nodes.
@@ -311,8 +320,14 @@ class CYbSEKvfGlobalBase : public CYbSEKvfBase {
  private:
   friend class CYbSEKvfBase;
 
+  /// Names are looked up all the time, as constants: without copies.
+  struct HashOfName {
+    using is_transparent = void;
+    std::size_t operator()(std::string_view name) const { return std::hash<std::string_view>()(name); }
+  };
+
   std::string targetName_;
-  std::unordered_map<std::string, CYbSEKvfBase*> importantNodes_;
+  std::unordered_map<std::string, CYbSEKvfBase*, HashOfName, std::equal_to<>> importantNodes_;
   std::string setupFolder_;
   bool revalidateAll_ = false;
 };

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <cstdint>
 #include <cstring>
 #include <string>
 #include <string_view>
@@ -12,6 +13,61 @@
 #include "platform/dates.h"
 
 namespace tervane {
+
+/// A number of all values that are put, as they are in a `StateBuffer`. A single value that changes always gives
+/// another number; of several at a time one in 2^64 cases would not.
+class StateFingerprint {
+ public:
+  std::uint64_t Number() const { return number_; }
+  void Clear() { number_ = 0; }
+
+  template <class Value>
+  requires(std::is_arithmetic_v<Value> || std::is_pointer_v<Value>) void Put(Value value) {
+    std::uint64_t bits = 0;
+    static_assert(sizeof value <= sizeof bits);
+    std::memcpy(&bits, &value, sizeof value);
+    // Each of the three can be taken back, so that no two values lead to one number.
+    number_ = (number_ ^ bits) * 0x9E3779B97F4A7C15;
+    number_ ^= number_ >> 29;
+  }
+  void Put(const std::string& value) {
+    Put(value.size());
+    // Eight bytes at a time; the last ones overlap those before them, since parts are slow to put together.
+    const char* const begin = value.data();
+    const char* const end = begin + value.size();
+    if (value.size() >= 8) {
+      for (const char* place = begin; place + 8 < end; place += 8) Put(Part<std::uint64_t>(place));
+      Put(Part<std::uint64_t>(end - 8));
+    } else if (value.size() >= 4) {
+      Put(std::uint64_t{Part<std::uint32_t>(begin)} << 32 | Part<std::uint32_t>(end - 4));
+    } else {
+      for (const char* place = begin; place < end; ++place) Put(*place);
+    }
+  }
+  void Put(const FileName& value) {
+    Put(value.Text());
+    Put(value.Folder());
+  }
+  void Put(const CYbDateTime& value) {
+    for (const int field : {value.Year(), value.Month(), value.Day(), value.Hour(), value.Minute(), value.Second()})
+      Put(field);
+  }
+  template <class Value>
+  void Put(const std::vector<Value>& values) {
+    Put(values.size());
+    for (const Value& value : values) Put(value);
+  }
+
+ private:
+  template <class Number>
+  static Number Part(const char* place) {
+    Number number;
+    std::memcpy(&number, place, sizeof number);
+    return number;
+  }
+
+  std::uint64_t number_ = 0;
+};
 
 /// Values one behind the other as bytes: what a node holds, kept while the program runs. They are taken out in the
 /// order in which they were put.

@@ -2,9 +2,40 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "core/undo.h"
 
+#include <algorithm>
+#include <iterator>
+#include <unordered_map>
+#include <unordered_set>
+#include <utility>
+
 #include "core/dependent_list.h"
 
 namespace tervane {
+
+namespace {
+
+/// Puts all of a node's state that is no key and no child.
+void PutTexts(const std::string& title, const std::string& abbreviatedTitle, std::size_t plainChildren,
+              const LinkHolder* links, auto& state) {
+  state.Put(title);
+  state.Put(abbreviatedTitle);
+  state.Put(plainChildren);
+  if (!links) return;
+  const std::vector<void*> addresses = links->Links();
+  state.Put(addresses.size());
+  for (void* address : addresses) state.Put(reinterpret_cast<std::uintptr_t>(address));
+}
+
+/// A walk over many nodes waits for memory more than it works, unless what comes soon was asked for before.
+void AskFor([[maybe_unused]] const void* memory, [[maybe_unused]] std::size_t size) {
+#ifdef __GNUC__
+  constexpr std::size_t kLine = 64;
+  for (std::size_t offset = 0; offset < size; offset += kLine)
+    __builtin_prefetch(static_cast<const char*>(memory) + offset);
+#endif
+}
+
+}  // namespace
 
 UndoStack::UndoStack(CYbSEKvfGlobalBase& root) : root_(root) { Reset(); }
 
@@ -13,65 +44,145 @@ UndoStack::~UndoStack() = default;
 void UndoStack::Reset() {
   steps_.clear();
   done_ = saved_ = 0;
-  shadow_.clear();
-  CaptureAll();
+  known_.clear();
+  Learn(root_, known_);
 }
 
-bool UndoStack::TakeState(CYbSEKvfBase& node, const State* known, State& state) {
-  values_.Clear();
-  KeyExchange keys = KeyExchange::Keeping(values_);
+// ---- What is known
+
+void UndoStack::Learn(CYbSEKvfBase& node, std::vector<Known>& known) {
+  if (!node.HoldsSetup()) return;
+  const std::size_t place = known.size();
+  Known& learned = known.emplace_back(Known{&node, dynamic_cast<LinkHolder*>(&node), 0, 0, nullptr});
+  learned.fingerprint = FingerprintOf(learned);
+  learned.state = std::make_unique<State>(StateOf(learned));
+  for (const auto* nodes : {&node.properties_, &node.children_})
+    for (const auto& below : *nodes) Learn(*below, known);
+  known[place].size = known.size() - place;
+}
+
+std::shared_ptr<CYbSEKvfBase> UndoStack::OwnerOf(const CYbSEKvfBase& node) {
+  const std::ptrdiff_t place = node.parent_ ? node.parent_->IndexOfChild(&node) : -1;
+  return place < 0 ? nullptr : node.parent_->children_[static_cast<std::size_t>(place)];
+}
+
+UndoStack::State UndoStack::StateOf(const Known& known) const {
+  CYbSEKvfBase& node = *known.node;
+  StateBuffer state;
+  PutTexts(node.title_, node.abbreviatedTitle_, node.plainChildren_, known.links, state);
+  KeyExchange keys = KeyExchange::Keeping(state);
   node.ExchangeState(keys);
-  const auto* holder = dynamic_cast<const LinkHolder*>(&node);
-  std::vector<void*> links = holder ? holder->Links() : std::vector<void*>();
-  if (known && known->values == values_.Bytes() && known->title == node.title_ &&
-      known->abbreviatedTitle == node.abbreviatedTitle_ && known->children == node.children_ &&
-      known->plainChildren == node.plainChildren_ && known->links == links)
-    return false;
-  state = {values_.Bytes(), node.title_, node.abbreviatedTitle_, node.children_, node.plainChildren_, std::move(links)};
-  return true;
+  return {state.Bytes(), node.children_};
+}
+
+std::uint64_t UndoStack::FingerprintOf(const Known& known) {
+  CYbSEKvfBase& node = *known.node;
+  fingerprint_.Clear();
+  fingerprint_.Put(node.children_.size());
+  for (const auto& child : node.children_) fingerprint_.Put(child.get());
+  PutTexts(node.title_, node.abbreviatedTitle_, node.plainChildren_, known.links, fingerprint_);
+  node.ExchangeState(fingerprinting_);
+  return fingerprint_.Number();
+}
+
+std::vector<UndoStack::Change> UndoStack::TakeChanges() {
+  std::vector<Change> changes;
+  std::vector<std::size_t> rearranged;
+  // The node far ahead, and what hangs at the one near by, which has come by now.
+  const auto askFor = [this](std::size_t place) {
+    constexpr std::size_t kFar = 8, kNear = 3, kFront = 64, kTexts = 64, kUsualValues = 128, kUsualChildren = 64;
+    if (place + kFar < known_.size()) {
+      const CYbSEKvfBase* node = known_[place + kFar].node;
+      AskFor(node, kFront);
+      AskFor(reinterpret_cast<const char*>(node) + sizeof(CYbSEKvfBase) - kTexts, kTexts + kUsualValues);
+    }
+    if (place + kNear < known_.size()) {
+      const CYbSEKvfBase& node = *known_[place + kNear].node;
+      if (!node.children_.empty()) AskFor(node.children_.data(), kUsualChildren);
+      AskFor(node.title_.data(), 1);
+    }
+  };
+  // Also what was taken out of the tree is met: it may have changed on its way out, when its links were cut.
+  for (std::size_t place = 0; place < known_.size(); ++place) {
+    askFor(place);
+    Known& known = known_[place];
+    if (FingerprintOf(known) == known.fingerprint) continue;
+    State before = TakeState(known);
+    if (before.children != known.state->children) rearranged.push_back(place);
+    changes.push_back({known.node, OwnerOf(*known.node), std::move(before), *known.state});
+  }
+  Arrange(rearranged);
+  return changes;
+}
+
+UndoStack::State UndoStack::TakeState(Known& known) {
+  known.fingerprint = FingerprintOf(known);
+  return std::exchange(*known.state, StateOf(known));
+}
+
+void UndoStack::TakeRestored(const Step& step) {
+  std::unordered_set<const CYbSEKvfBase*> restored;
+  for (const Change& change : step.changes) restored.insert(change.node);
+  std::vector<std::size_t> rearranged;
+  for (std::size_t place = 0; place < known_.size(); ++place)
+    if (Known& known = known_[place]; restored.contains(known.node))
+      if (TakeState(known).children != known.state->children) rearranged.push_back(place);
+  Arrange(rearranged);
+}
+
+void UndoStack::Arrange(const std::vector<std::size_t>& changed) {
+  if (changed.empty()) return;
+  std::vector<Known> arranged;
+  arranged.reserve(known_.size());
+  ArrangeAt(0, changed, arranged);
+  // What was taken out is forgotten: the change of its parent keeps it alive, and it holds its values itself.
+  known_ = std::move(arranged);
+}
+
+void UndoStack::ArrangeAt(std::size_t place, const std::vector<std::size_t>& changed, std::vector<Known>& arranged) {
+  const std::size_t end = place + known_[place].size;
+  const auto next = std::ranges::lower_bound(changed, place);
+  if (next == changed.end() || *next >= end) {
+    std::move(known_.begin() + static_cast<std::ptrdiff_t>(place), known_.begin() + static_cast<std::ptrdiff_t>(end),
+              std::back_inserter(arranged));
+    return;
+  }
+  std::unordered_map<const CYbSEKvfBase*, std::size_t> places;
+  for (std::size_t below = place + 1; below < end; below += known_[below].size) places[known_[below].node] = below;
+  const CYbSEKvfBase& node = *known_[place].node;
+  const std::size_t arrangedPlace = arranged.size();
+  arranged.push_back(std::move(known_[place]));
+  for (const auto* nodes : {&node.properties_, &node.children_})
+    for (const auto& below : *nodes) {
+      const auto found = places.find(below.get());
+      found == places.end() ? Learn(*below, arranged) : ArrangeAt(found->second, changed, arranged);
+    }
+  arranged[arrangedPlace].size = arranged.size() - arrangedPlace;
 }
 
 void UndoStack::Restore(CYbSEKvfBase& node, const State& state) {
   node.children_ = state.children;
-  node.plainChildren_ = state.plainChildren;
-  node.title_ = state.title;
-  node.abbreviatedTitle_ = state.abbreviatedTitle;
-  StateBuffer values(state.values);
-  KeyExchange keys = KeyExchange::Restoring(values);
+  // What comes back has the findings that it left with.
+  for (CYbSEKvfBase* above = &node; above; above = above->parent_) above->isClear_ = false;
+  StateBuffer bytes(state.bytes);
+  bytes.Take(node.title_);
+  bytes.Take(node.abbreviatedTitle_);
+  bytes.Take(node.plainChildren_);
+  auto* holder = dynamic_cast<LinkHolder*>(&node);
+  std::vector<std::uintptr_t> addresses;
+  if (holder) bytes.Take(addresses);
+  KeyExchange keys = KeyExchange::Restoring(bytes);
   node.ExchangeState(keys);
-  if (auto* links = dynamic_cast<LinkHolder*>(&node)) links->SetLinks(state.links);
+  // Behind the values, since a name that is set is passed on along the links.
+  std::vector<void*> links;
+  for (const std::uintptr_t address : addresses) links.push_back(reinterpret_cast<void*>(address));
+  if (holder) holder->SetLinks(links);
 }
 
-void UndoStack::Capture(CYbSEKvfBase& node, const std::shared_ptr<CYbSEKvfBase>& owner, std::vector<Change>& changes) {
-  if (!node.HoldsSetup()) return;
-  const auto [place, isNew] = shadow_.try_emplace(&node);
-  Shadow& shadow = place->second;
-  shadow.round = round_;
-  if (State state; TakeState(node, isNew ? nullptr : &shadow.state, state)) {
-    if (!isNew) changes.push_back({&node, owner, std::move(shadow.state), state});
-    shadow.state = std::move(state);
-  }
-  for (const auto& property : node.properties_) Capture(*property, property, changes);
-  for (const auto& child : node.children_) Capture(*child, child, changes);
-}
-
-std::vector<UndoStack::Change> UndoStack::CaptureAll() {
-  std::vector<Change> changes;
-  ++round_;
-  Capture(root_, nullptr, changes);
-  // What was taken out of the tree may have changed on its way out: its links were cut. From here on it is forgotten:
-  // the change of its parent keeps it alive, and it holds its values itself.
-  for (auto& [node, shadow] : shadow_) {
-    if (shadow.round == round_) continue;
-    if (State state; TakeState(*node, &shadow.state, state))
-      changes.push_back({node, nullptr, std::move(shadow.state), std::move(state)});
-  }
-  std::erase_if(shadow_, [this](const auto& entry) { return entry.second.round != round_; });
-  return changes;
-}
+// ---- Steps
 
 bool UndoStack::Commit(const std::string& name, const void* source, Time now, StepPlace place) {
-  std::vector<Change> changes = CaptureAll();
+  std::vector<Change> changes = TakeChanges();
   if (changes.empty()) return false;
   steps_.erase(steps_.begin() + static_cast<std::ptrdiff_t>(done_), steps_.end());
   if (saved_ > done_) saved_ = static_cast<std::size_t>(-1);  // what was saved cannot be reached any more
@@ -106,7 +217,7 @@ bool UndoStack::Undo() {
   const Step& step = steps_[--done_];
   for (auto change = step.changes.rbegin(); change != step.changes.rend(); ++change)
     Restore(*change->node, change->before);
-  CaptureAll();
+  TakeRestored(step);
   return true;
 }
 
@@ -114,7 +225,7 @@ bool UndoStack::Redo() {
   if (!CanRedo()) return false;
   const Step& step = steps_[done_++];
   for (const Change& change : step.changes) Restore(*change.node, change.after);
-  CaptureAll();
+  TakeRestored(step);
   return true;
 }
 

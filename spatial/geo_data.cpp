@@ -27,11 +27,12 @@ namespace {
 
 /// The rule of a quantity of water movement, made once for each way to tell parameters: layers have many of them.
 const Condition& WaterMovementBy(int distribution) {
-  static const auto rule = [](int by) { return Component(&CModelCompKvf::WM) && GroundParametersBy(by); };
   static std::map<int, Condition> rules;
   static std::mutex mutex;
   const std::lock_guard lock(mutex);
-  return rules.try_emplace(distribution, rule(distribution)).first->second;
+  const auto [place, isNew] = rules.try_emplace(distribution);
+  if (isNew) place->second = Component(&CModelCompKvf::WM) && GroundParametersBy(distribution);
+  return place->second;
 }
 
 }  // namespace
@@ -41,7 +42,7 @@ CGeoDataWM2DKvf::CGeoDataWM2DKvf(Data2DKind kind, int distribution, CYbSEKvfBase
 
 int JudgedData2DKvf::ValidateData() {
   const int isValid = CData2DKvf::ValidateData();
-  if (CYbSEKvfBase* parent = GetParent()) parent->ValidateData();
+  if (CYbSEKvfBase* parent = GetParent(); parent && !IsValidatedWithParent()) parent->ValidateData();
   if (!HasValidationMessage()) return isValid;
   // Beside the text, which is the same for all, stand the parent's name and its own.
   const CYbSEKvfBase* parent = GetParent();

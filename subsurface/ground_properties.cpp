@@ -171,12 +171,15 @@ void MakeProperties(CYbSEKvfBase& owner, std::span<const GroundProperty> rows, b
 
 bool JudgeProperties(const CYbSEKvfBase& owner, std::span<const GroundProperty> rows) {
   bool areValid = true;
-  for (const GroundProperty& row : rows) {
-    if (row.range == GroundProperty::Range::None) continue;
-    CData2DKvf* property = PropertyOf(owner, row.section);
-    auto* judged = dynamic_cast<CTvn2DKvfValidationAbstract*>(property);
+  // The quantities stand in the order of their rows.
+  auto row = rows.begin();
+  for (CYbSEKvfBase* child = owner.GetFirstChild(); child && row != rows.end(); child = owner.GetNextChild(child)) {
+    if (child->GetSectionName() != row->section) continue;
+    const GroundProperty::Range range = row++->range;
+    if (range == GroundProperty::Range::None) continue;
+    auto* judged = dynamic_cast<CTvn2DKvfValidationAbstract*>(child);
     if (!judged) continue;
-    std::string why = property->IsDlgUsedInSetup() ? WhyOutside(row.range, judged->GetValidationValue()) : "";
+    std::string why = child->IsDlgUsedInSetup() ? WhyOutside(range, judged->GetValidationValue()) : "";
     areValid = areValid && why.empty();
     judged->SetValidationMessage(std::move(why));
   }

@@ -2,6 +2,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "core/undo.h"
 
+#include <random>
+
+#include <fmt/format.h>
 #include <gmock/gmock.h>
 
 #include "core/dependent_list.h"
@@ -10,6 +13,7 @@
 #include "simspec/model_components.h"
 #include "simspec/periods.h"
 #include "simspec/titles.h"
+#include "tests/core/node_tree.h"
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 
@@ -225,6 +229,153 @@ TEST(Undo, WhatWasDeletedComesBackWithItsLinksInEveryDependent) {
   undo.Undo();
   EXPECT_EQ(first->Names(), "N P K ");
   for (int number = 1; number <= 3; ++number) EXPECT_EQ(master->GetItem(number)->LinkedItems().size(), 2u);
+}
+
+TEST(Undo, WhatComesBackBelowWhatTakesNoPartHasNoFindings) {
+  test::Root root;
+  auto* above = root.NewChild<test::ValueGroup>("Above");
+  auto* item = above->NewChild<test::ValueNode>("Item");
+  item->Finds = {{Severity::Warning, "odd", {}, {}}};
+  UndoStack undo(root);
+  root.Validate();
+  ASSERT_EQ(item->Findings().size(), 1u);
+  above->RemoveChild(item);
+  ASSERT_TRUE(undo.Commit("Delete"));
+  above->Used = 0;
+  root.Validate();
+  undo.Undo();
+  root.Validate();
+  EXPECT_TRUE(item->Findings().empty());
+  above->Used = 1;
+  root.Validate();
+  EXPECT_EQ(item->Findings().size(), 1u);
+}
+
+// ---- Random walks
+
+/// A number from 0 to below `count`.
+std::size_t Below(std::mt19937& random, std::size_t count) {
+  return std::uniform_int_distribution<std::size_t>(0, count - 1)(random);
+}
+
+/// Walks at random through edits, undo and redo: what `show` tells of the tree must come back exactly.
+void Walk(UndoStack& undo, std::mt19937& random, int actions, const std::function<void()>& edit,
+          const std::function<std::string()>& show) {
+  std::vector<std::string> shown{show()};  // after each step that is done or can be redone
+  std::size_t done = 0;
+  for (int action = 0; action < actions; ++action) {
+    const std::size_t choice = Below(random, 5);
+    if (choice > 1) {
+      edit();
+      std::string after = show();
+      // What a setup's file does not tell may have changed alone.
+      if (undo.Commit("Edit")) {
+        shown.resize(++done);
+        shown.push_back(std::move(after));
+      } else {
+        ASSERT_EQ(after, shown[done]) << "missed after " << action << " actions";
+      }
+      continue;
+    }
+    if (choice == 0) {
+      ASSERT_EQ(undo.Undo(), done > 0);
+      if (done > 0) --done;
+    } else {
+      ASSERT_EQ(undo.Redo(), done + 1 < shown.size());
+      if (done + 1 < shown.size()) ++done;
+    }
+    ASSERT_EQ(show(), shown[done]) << "after " << action << " actions";
+  }
+  while (undo.Undo()) ASSERT_EQ(show(), shown[--done]);
+  while (undo.Redo()) ASSERT_EQ(show(), shown[++done]);
+}
+
+/// All that holds the setup, and the lists among it.
+void Collect(CYbSEKvfBase& node, std::vector<CYbSEKvfBase*>& nodes, std::vector<CYbSEKvfListBaseInterface*>& lists) {
+  if (!node.HoldsSetup()) return;
+  nodes.push_back(&node);
+  if (auto* list = dynamic_cast<CYbSEKvfListBaseInterface*>(&node)) lists.push_back(list);
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+    Collect(*child, nodes, lists);
+}
+
+void ChangeKey(CYbSEKvfBase& node, std::mt19937& random) {
+  std::vector<KeyInfo> keys;
+  node.DescribeKeys(keys);
+  std::erase_if(keys, [](const KeyInfo& key) { return !key.written || !key.member; });
+  if (keys.empty()) return;
+  const KeyInfo& key = keys[Below(random, keys.size())];
+  void* member = const_cast<void*>(key.member);
+  const int number = static_cast<int>(Below(random, 4));
+  if (key.type == "int") *static_cast<int*>(member) = number;
+  if (key.type == "float") *static_cast<float*>(member) = 0.5F * static_cast<float>(number);
+  if (key.type == "double") *static_cast<double*>(member) = 0.5 * number;
+  if (key.type == "bool") *static_cast<bool*>(member) = number > 1;
+  if (key.type == "string") *static_cast<std::string*>(member) = std::string(static_cast<std::size_t>(number) * 9, 'x');
+  if (key.type == "filename") *static_cast<FileName*>(member) = FileName(fmt::format("a{}.nds2", number), "/data");
+}
+
+void ChangeList(CYbSEKvfListBaseInterface& list, std::mt19937& random) {
+  const int count = list.GetItemCount(), number = static_cast<int>(Below(random, static_cast<std::size_t>(count) + 1));
+  switch (Below(random, 6)) {
+    case 0:
+      return list.SetItemCount(number, 1);
+    case 1:
+      return void(list.MoveItemUp(number, 1));
+    case 2:
+      return void(list.MoveItemDown(number, 1));
+    case 3:
+      return list.DeleteItem(number, 1);
+    case 4:
+      return list.InsertItem(number, 1);
+    default:
+      if (count < 4) list.AddItemNode();
+  }
+}
+
+TEST_F(UndoOfASetup, ARandomWalkComesBackToEveryState) {
+  std::mt19937 random(1);
+  const auto edit = [&] {
+    std::vector<CYbSEKvfBase*> nodes;
+    std::vector<CYbSEKvfListBaseInterface*> lists;
+    Collect(document.Root(), nodes, lists);
+    // One step may hold several changes.
+    for (std::size_t changes = Below(random, 3) + 1; changes > 0; --changes) {
+      CYbSEKvfBase& node = *nodes[Below(random, nodes.size())];
+      Below(random, 8) == 0 ? node.SetTitle(fmt::format("title {}", Below(random, 3))) : ChangeKey(node, random);
+    }
+    if (Below(random, 2) == 0) ChangeList(*lists[Below(random, lists.size())], random);
+  };
+  Walk(undo, random, 1000, edit, [this] { return SavedText(document); });
+}
+
+TEST(Undo, ARandomWalkKeepsLinksInEveryDependent) {
+  CYbSEKvfGlobalBase root("T");
+  auto* master = root.NewChild<Master>();
+  const auto* first = root.NewChild<Dependent>();
+  const auto* second = root.NewChild<Dependent>();
+  UndoStack undo(root);
+  std::mt19937 random(2);
+  const auto edit = [&] {
+    const int count = master->GetItemCount();
+    if (count > 0 && Below(random, 3) == 0)
+      master->GetItem(static_cast<int>(Below(random, static_cast<std::size_t>(count))) + 1)
+          ->SetName(fmt::format("{}", Below(random, 100)));
+    else
+      ChangeList(*master, random);
+  };
+  const auto show = [&] {
+    std::string names = first->Names();
+    EXPECT_EQ(second->Names(), names);
+    for (int number = 1; number <= master->GetItemCount(); ++number) {
+      Species& species = *master->GetItem(number);
+      EXPECT_EQ(species.GetName(), first->GetChild(number)->GetTitle());
+      EXPECT_EQ(species.LinkedItems().size(), 2u);
+      for (const CSpeciesItemBase* entry : species.LinkedItems()) names += entry->GetName() + " ";
+    }
+    return names;
+  };
+  Walk(undo, random, 5000, edit, show);
 }
 
 }  // namespace
