@@ -1,16 +1,27 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// Large well files, and sections and columns through many layers of large grids.
+// Large well files, sections and columns through many layers of large grids, boundaries of many segments, and setups of
+// many layers that are opened, saved and edited.
+#include <algorithm>
 #include <cmath>
+#include <memory>
+#include <numbers>
+#include <random>
 #include <string>
 #include <vector>
 
 #include <fmt/format.h>
+#include <malloc.h>
 
 #include "bench/median_table.h"
+#include "document/edit_session.h"
 #include "forms/section_profile.h"
 #include "libraries/wells.h"
+#include "spatial/domain_boundary.h"
+#include "subsurface/computational_layers.h"
+#include "subsurface/geology.h"
+#include "subsurface/saturated_zone.h"
 
 namespace tervane::bench {
 
@@ -63,6 +74,156 @@ SectionContent Layers() {
   return section;
 }
 
+// ---- Boundaries
+
+constexpr int kDomainSide = 2000, kSegments = 1000;
+
+/// A round domain: 1 inside, 2 at its boundary.
+CGeoDataBoundCondCatchmentData Domain() {
+  const auto isInside = [](int i, int j) {
+    constexpr double kMiddle = kDomainSide / 2.0;
+    return std::hypot(i + 0.5 - kMiddle, j + 0.5 - kMiddle) < kMiddle - 2;
+  };
+  std::vector<float> codes;
+  codes.reserve(static_cast<std::size_t>(kDomainSide) * kDomainSide);
+  for (int j = 0; j < kDomainSide; ++j)
+    for (int i = 0; i < kDomainSide; ++i) {
+      const bool isSurrounded = isInside(i - 1, j) && isInside(i + 1, j) && isInside(i, j - 1) && isInside(i, j + 1);
+      codes.push_back(!isInside(i, j) ? kUsualDeleteValue : isSurrounded ? 1.0F : 2.0F);
+    }
+  CGeoDataBoundCondCatchmentData domain;
+  if (const std::string error = domain.TakeValues({kDomainSide, kDomainSide, 10, 0, 0, 0, {}}, std::move(codes),
+                                                  kUsualDeleteValue, 0, quantity::kCode);
+      !error.empty())
+    fmt::print("{}\n", error);
+  return domain;
+}
+
+/// Segments around it in no order.
+std::vector<BoundaryItem> Segments() {
+  std::vector<BoundaryItem> segments;
+  for (int i = 0; i < kSegments; ++i) {
+    const double angle = 2 * std::numbers::pi * i / kSegments, radius = 5.0 * kDomainSide;
+    segments.push_back({MapPoint{radius * (1 + std::cos(angle)), radius * (1 + std::sin(angle))}, i % 4});
+  }
+  std::shuffle(segments.begin(), segments.end(), std::mt19937(1));
+  return segments;
+}
+
+std::size_t TraceSortPaint(CGeoDataBoundCondCatchmentData& domain, const std::vector<BoundaryItem>& segments) {
+  std::string message;
+  if (!domain.PrepareBoundary(message)) fmt::print("WRONG: not traced: {}\n", message);
+  std::vector<BoundaryItem> sorted;
+  for (const std::size_t item : domain.BoundaryOrder(segments)) sorted.push_back(segments[item]);
+  domain.PaintBoundaryTypes(sorted);
+  if (domain.BoundaryPoints.size() != segments.size()) fmt::print("WRONG: not all segments were painted\n");
+  return domain.BoundaryCells.size();
+}
+
+// ---- Setups of many layers
+
+constexpr int kFew = 20, kMany = 200;
+/// Some 70,000 quantities, 300,000 nodes with those of their files.
+constexpr int kVeryMany = 2400;
+
+/// Puts that many layers into each list. Files are named and not in use, as in a setup that was worked on.
+void MakeLayers(CFlowModelDoc& setup, int count) {
+  const CSatZoneKvf& zone = *setup.Root().Important(kSaturatedZone);
+  for (CYbSEKvfListBaseInterface* list : {static_cast<CYbSEKvfListBaseInterface*>(&zone.Layers()),
+                                          static_cast<CYbSEKvfListBaseInterface*>(&zone.LayersOfGeology()),
+                                          static_cast<CYbSEKvfListBaseInterface*>(&zone.OwnLayers())})
+    list->SetItemCount(count, 1);
+  for (int number = 1; number <= count; ++number) {
+    const CGeoLayerSZItemKvf& layer = *zone.Layers().GetItem(number);
+    for (CYbSEKvfBase* child = layer.GetFirstChild(); child; child = layer.GetNextChild(child))
+      if (auto* property = dynamic_cast<CData2DKvf*>(child))
+        property->GridFile().File = FileName(fmt::format("maps/layer_{}.nds2", number), "/setups");
+  }
+}
+
+std::string TextOf(const CFlowModelDoc& setup) {
+  std::string text, error;
+  if (!setup.BuildText("/setups", text, error)) fmt::print("WRONG: not saved: {}\n", error);
+  return text;
+}
+
+int NodesBelow(const CYbSEKvfBase& node) {
+  int count = 0;
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+    count += 1 + NodesBelow(*child);
+  return count;
+}
+
+int TakingPartBelow(CYbSEKvfBase& node) {
+  int count = 0;
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+    if (child->IsDlgUsedInSetup()) count += 1 + TakingPartBelow(*child);
+  return count;
+}
+
+/// A setup that is opened, validated, saved and asked who takes part.
+struct LayeredSetup {
+  std::string label, text;
+  CFlowModelDoc setup;
+
+  LayeredSetup(int count, MedianTable& table) : label(fmt::format("{} layers", count)) {
+    MakeLayers(setup, count);
+    text = TextOf(setup);
+    table.Add(
+        "open " + label, [] { return std::make_unique<CFlowModelDoc>(); },
+        [this](auto& opened) {
+          if (!opened->OpenText(text, "/setups/layers.tvd")) fmt::print("WRONG: not opened: {}\n", opened->Error());
+          return opened.get();
+        });
+    table.Add("validate " + label, [this] { return setup.Root().Validate(); });
+    table.Add("save " + label, [this] { return TextOf(setup); });
+    table.Add("who takes part, " + label, [this] { return TakingPartBelow(setup.Root()); });
+  }
+};
+
+/// A setup that is edited, with undo.
+struct EditedSetup {
+  std::unique_ptr<EditSession> session = EditSession::New({});
+  CGeoLayerSZKvf& layers = session->Document().Root().Important(kSaturatedZone)->Layers();
+  std::vector<std::string> names;
+
+  EditedSetup(int count, MedianTable& table) {
+    const std::size_t before = mallinfo2().uordblks;
+    MakeLayers(session->Document(), count);
+    session->UpdateDoc(layers, 1, "Make Layers");
+    fmt::print("editing {} layers, {} nodes: {} MB\n", count, NodesBelow(session->Document().Root()),
+               (mallinfo2().uordblks - before) / 1'000'000);
+    const auto add = [&](const std::string& what, double limit, const auto& measured) {
+      names.push_back(fmt::format("{}, {} layers", what, count));
+      table.Add(names.back(), measured);
+      table.LimitTime(names.back(), limit);
+    };
+    const double structure = count > kMany ? 100 : 50;
+    add("type a value", 50, [this] {
+      CData2DKvf& level = *layers.GetItem(layers.GetItemCount() / 2)->Child<CData2DKvf>();
+      level.FixedValue += 1;
+      session->UpdateDoc(level, 1, "Change Lower Level");
+      return session->Steps().CanUndo();
+    });
+    add("undo and redo a value", 100, [this] { return session->Undo() && session->Redo(); });
+    add("rename a layer", structure, [this] {
+      layers.GetItem(1)->Name += "x";
+      session->UpdateDoc(layers, 1, "Rename Layer");
+      return session->Steps().CanUndo();
+    });
+    add("add a layer", structure, [this] {
+      layers.InsertItem(2, 1);
+      session->UpdateDoc(layers, 2, "Add Layer");
+      return session->Steps().CanUndo();
+    });
+    add("delete a layer", structure, [this] {
+      layers.DeleteItem(2, 1);
+      session->UpdateDoc(layers, 4, "Delete Layer");
+      return session->Steps().CanUndo();
+    });
+  }
+};
+
 int Run(int argc, char** argv) {
   const FileContent wells = WellText();
   const SectionContent section = Layers();
@@ -84,6 +245,20 @@ int Run(int argc, char** argv) {
   // What is moved follows the pointer at 30 pictures a second.
   table.LimitTime("section through 20 layers", 33);
   table.LimitTime("column through 20 layers", 10);
+
+  const CGeoDataBoundCondCatchmentData domain = Domain();
+  const std::vector<BoundaryItem> segments = Segments();
+  table.Add(
+      "trace, sort and paint 1,000 segments", [&] { return domain; },
+      [&](CGeoDataBoundCondCatchmentData& traced) { return TraceSortPaint(traced, segments); });
+  table.LimitTime("trace, sort and paint 1,000 segments", 200);
+
+  const LayeredSetup few(kFew, table), many(kMany, table);
+  // Ten times the size; the rest is for what no longer fits the processor's caches.
+  for (const char* what : {"open ", "validate ", "save ", "who takes part, "})
+    table.Limit(what + many.label, what + few.label, 11);
+  table.LimitTime("who takes part, " + many.label, 20);
+  const EditedSetup edited(kMany, table), full(kVeryMany, table);
   table.Run(argc, argv);
   return 0;
 }
