@@ -116,6 +116,8 @@ std::string TakeTyped(std::string_view typed, const KeyInfo* info, KvfSection& s
   if (info && (info->type == "int list" || info->type == "string list"))
     return TakeList(typed, info->type == "int list", section, keyword);
   if (keyword.count == 1) return TakeOne(typed, info, *section.file, keyword.params[0]);
+  // Numbers behind the name of a file are made when it is saved.
+  if (keyword.params[0].type == KvfType::Filename) return TakeOne(typed, info, *section.file, keyword.params[0]);
   const bool isDate = info && (info->type == "date" || info->type == "day");
   if (isDate && TakeDate(typed, keyword)) return {};
   const auto parts = Parts(typed, typed.find(',') != std::string_view::npos ? "," : "-T: ");

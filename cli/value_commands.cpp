@@ -13,6 +13,7 @@
 #include "cli/typed_value.h"
 #include "core/kvf_writer.h"
 #include "document/key_reference.h"
+#include "document/setup_diff.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -68,7 +69,7 @@ std::unique_ptr<CFlowModelDoc> Changed(CFlowModelDoc& document, const Change& ch
   const KeyInfo* info = reference.Find(PathOf(*node), Trimmed(path.key.name));
   if (const std::string expected = TakeTyped(change.value, info, *section, *key); !expected.empty())
     return refuse(expected + " was expected");
-  const std::string wanted = KvfValuesText(*key);
+  const std::string wanted = ComparedText(*key);
   std::string text, error;
   auto changed = std::make_unique<CFlowModelDoc>();
   if (!WriteKvfText(written.File(), text, error)) return refuse(error);
@@ -79,7 +80,7 @@ std::unique_ptr<CFlowModelDoc> Changed(CFlowModelDoc& document, const Change& ch
   const KvfNode* taken = changedSection ? FindKvfNode(*changedSection, true, Trimmed(path.key.name),
                                                       static_cast<std::size_t>(path.key.instance))
                                         : nullptr;
-  if (!taken || KvfValuesText(*taken) != wanted)
+  if (!taken || ComparedText(*taken) != wanted)
     return refuse(fmt::format("the setup does not take this value: it would be saved as {}",
                               taken ? PlainValuesText(*taken) : "nothing"));
   changed->Continue(document);

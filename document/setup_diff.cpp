@@ -19,12 +19,6 @@ constexpr std::array<std::string_view, 3> kComputed{"Touched", "IsDataUsedInSetu
 
 bool IsComputed(std::string_view key) { return std::find(kComputed.begin(), kComputed.end(), key) != kComputed.end(); }
 
-/// The values as they are compared: numbers behind the name of a file are made at each save.
-std::string ComparedText(const KvfNode& keyword) {
-  const bool isFile = keyword.count > 0 && keyword.params[0].type == KvfType::Filename;
-  return isFile ? KvfValueText(keyword.params[0]) : KvfValuesText(keyword);
-}
-
 /// Nodes of one kind, with the instance number of each among those of its name.
 struct NumberedNode {
   KvfNode* node;
@@ -190,6 +184,11 @@ class Comparison {
 };
 
 }  // namespace
+
+std::string ComparedText(const KvfNode& keyword) {
+  const bool isFile = keyword.count > 0 && keyword.params[0].type == KvfType::Filename;
+  return isFile ? KvfValueText(keyword.params[0]) : KvfValuesText(keyword);
+}
 
 std::vector<SetupDifference> CompareSetups(KvfSection& from, KvfSection& to, const KeyReference& reference) {
   Comparison comparison(reference);

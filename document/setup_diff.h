@@ -24,6 +24,9 @@ struct SetupDifference {
   std::string toMeaning = {};
 };
 
+/// The values of a key as two files are compared: numbers behind the name of a file are made at each save.
+std::string ComparedText(const KvfNode& keyword);
+
 /// The differences between two sections as they are written, in the order of the new one. Items of a list are followed
 /// to their new places: first by equal content, then by equal `Name`, then by place. What every save computes anew
 /// (`IsDataUsedInSetup`, item counts) and whether a page was visited (`Touched`) is left out.

@@ -270,15 +270,17 @@ TEST_F(CommandLine, SetChangesOneValueAndNothingElse) {
 TEST_F(CommandLine, SetTakesWhatAPageTakesAndSeveralKeysOrNone) {
   const struct {
     const char *path, *typed, *value;
-  } cases[] = {{"SimSpec/ModelComp:UZ_ModelType", "richards equation", "0"},
-               {"SimSpec:ModelType", "MODFLOW 96", "2"},
-               {"Climate/PrecipitationRate:DistributionType", "Station based", "2"},  // Counted from 1.
-               {"SimSpec/CompControlParaTimeStep:MaxAllowedSZTimeStep", "2 days", "48"},
-               {"SimSpec/CompControlParaTimeStep:MaxAllowedSZTimeStep", "36", "36"},
-               {"Topography:SearchRadius", "1.5 km", "1500"},
-               {"SimSpec/SimulationPeriod:SIMEND", "2011-01-01", "2011, 1, 1, 0, 0"},
-               {"Topography/NDS_2D_DATA_FILE:ITEM_NUMBERS", "3, 4", "3, 4"},
-               {"Topography/SHAPE_FILE:ITEM_NUMBERS", "CODE", "CODE"}};
+  } cases[] = {
+      {"SimSpec/ModelComp:UZ_ModelType", "richards equation", "0"},
+      {"SimSpec:ModelType", "MODFLOW 96", "2"},
+      {"Climate/PrecipitationRate:DistributionType", "Station based", "2"},  // Counted from 1.
+      {"SimSpec/CompControlParaTimeStep:MaxAllowedSZTimeStep", "2 days", "48"},
+      {"SimSpec/CompControlParaTimeStep:MaxAllowedSZTimeStep", "36", "36"},
+      {"Topography:SearchRadius", "1.5 km", "1500"},
+      {"SimSpec/SimulationPeriod:SIMEND", "2011-01-01", "2011, 1, 1, 0, 0"},
+      {"Topography/NDS_2D_DATA_FILE:ITEM_NUMBERS", "3, 4", "3, 4"},
+      {"Topography/SHAPE_FILE:ITEM_NUMBERS", "CODE", "CODE"},
+      {"KinetraTemplateSpecification:TemplateFile_OL", "none.kinetra", "none.kinetra, -1, -1, -1, -1, -1, -1"}};
   for (const auto& c : cases) {
     Tervane({"new", file, "--force"});
     const Outcome outcome = Tervane({"set", file, c.path, c.typed});
