@@ -78,7 +78,7 @@ const CKinetraSpecKvf* SpecificationOf(const CYbSEKvfBase& node) { return node.I
 // ---- A template in use
 
 void CKinetraSolver::Load() {
-  const auto before = content_;
+  const auto before = content_;  // Which the old bindings lead to.
   auto oldConstants = std::move(constants), oldForcings = std::move(forcings);
   content_ = ReadKinetraTemplate(file.IsEmpty() ? std::string() : file.Absolute());
   constants = Unbound(content_->constants);
@@ -243,8 +243,7 @@ void CKinetraSpecKvf::UpdateSpecies(std::vector<std::string>& added) {
   for (int compartment = 0; compartment < kKinetraCompartments; ++compartment) {
     if (!IsCompartmentActive(1 << compartment)) continue;
     for (const CKinetraSolverItem& variable : Solver(compartment).Content().stateVariables) {
-      const auto isNamed = [&](const std::string& name) { return EqualIgnoringCase(name, variable.symbol); };
-      if (isSecondPart(variable.symbol) || std::ranges::any_of(species->Names(), isNamed)) continue;
+      if (isSecondPart(variable.symbol) || species->FindByName(variable.symbol)) continue;
       species->AddItem()->SetName(variable.symbol);
       added.push_back(fmt::format("{}: {}", PathOf(*species), variable.symbol));
     }

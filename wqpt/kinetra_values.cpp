@@ -31,8 +31,18 @@ ForcingKind TemplateForcingKind(std::string_view className) {
 const Data2DKind kTemplateLowerLevel{
     .className = "CData2DKvf", .section = "LowerLevel", .title = "Lower Level", .itemType = quantity::kElevation};
 
-constexpr KinetraListKind kConstantLists{"Kinetra Constants", "KinetraConstants", "Kinetra_Constants.htm"};
-constexpr KinetraListKind kForcingLists{"Kinetra Forcings", "KinetraForcings", "Kinetra_Forcings.htm"};
+constexpr KinetraListKind kOverlandConstants{"Kinetra Constants", "KinetraConstants", "Kinetra_Constants.htm",
+                                             "CKinetraConstantsOLItemKvf"};
+constexpr KinetraListKind kOverlandForcings{"Kinetra Forcings", "KinetraForcings", "Kinetra_Forcings.htm",
+                                            "CKinetraForcingsOLItemKvf"};
+constexpr KinetraListKind kLayerConstants{"Kinetra Constants", "KinetraConstants", "Kinetra_Constants.htm",
+                                          "CKinetraConstantsSZItemKvf"};
+constexpr KinetraListKind kLayerForcings{"Kinetra Forcings", "KinetraForcings", "Kinetra_Forcings.htm",
+                                         "CKinetraForcingsSZItemKvf"};
+constexpr KinetraListKind kSoilConstants{"Kinetra Constants", "KinetraConstants", "Kinetra_Constants.htm",
+                                         "CKinetraConstantsUZWQLayerListKvf"};
+constexpr KinetraListKind kSoilForcings{"Kinetra Forcings", "KinetraForcings", "Kinetra_Forcings.htm",
+                                        "CKinetraForcingsUZWQLayerListKvf"};
 
 /// Rules are shared: each water quality layer has lists of its own.
 const Condition& ActiveIn(ProcessTemplates::Compartment compartment) {
@@ -73,13 +83,15 @@ CKinetraForcingsUZWQLayerItemKvf::CKinetraForcingsUZWQLayerItemKvf(const int& di
   NewChild<C2DStationBasedDataKvf>(TemplateForcingKind({}), "Kinetra Forcing", "LayerData2DWQ");
 }
 
-CKinetraConstantsUZWQLayerListKvf::CKinetraConstantsUZWQLayerListKvf(CYbSEKvfBase* parent)
+CKinetraConstantsUZWQLayerListKvf::CKinetraConstantsUZWQLayerListKvf(std::string_view className, CYbSEKvfBase* parent)
     : KinetraValue(std::string(), std::string("KinetraConstant"), std::string("Constant_%d"), parent) {
+  SetClassName(className);
   SetPage(kKinetraConstantLayersPage);
 }
 
-CKinetraForcingsUZWQLayerListKvf::CKinetraForcingsUZWQLayerListKvf(CYbSEKvfBase* parent)
+CKinetraForcingsUZWQLayerListKvf::CKinetraForcingsUZWQLayerListKvf(std::string_view className, CYbSEKvfBase* parent)
     : KinetraValue("Kinetra layers for ", std::string("KinetraForcing"), std::string("Forcing_%d"), parent) {
+  SetClassName(className);
   SetPage(kKinetraForcingLayersPage);
 }
 
@@ -87,46 +99,28 @@ CKinetraForcingsUZWQLayerListKvf::CKinetraForcingsUZWQLayerListKvf(CYbSEKvfBase*
 
 template <class Item>
 KinetraListKvf<Item>::KinetraListKvf(const KinetraListKind& kind, Condition takesPart, CYbSEKvfBase* parent)
-    : CYbSEKvfAbstractListBase<Item>(kind.title, kind.section, parent) {
+    : CYbSEKvfAbstractListBase<Item>(kind.title, kind.section, parent), itemClassName_(kind.itemClassName) {
   this->SetHelp("Top.chm", kind.helpPage);
   this->SetPage(kHelpPage);
   this->TakesPartWhen(std::move(takesPart));
 }
 
 CKinetraConstantsOLKvf::CKinetraConstantsOLKvf(CYbSEKvfBase* parent)
-    : KinetraListKvf(kConstantLists, ActiveIn(ProcessTemplates::kOverland), parent) {}
-std::unique_ptr<KinetraConstantKvf> CKinetraConstantsOLKvf::NewItem() {
-  return std::make_unique<KinetraConstantKvf>("CKinetraConstantsOLItemKvf", this);
-}
+    : KinetraListKvf(kOverlandConstants, ActiveIn(ProcessTemplates::kOverland), parent) {}
 
 CKinetraForcingsOLKvf::CKinetraForcingsOLKvf(CYbSEKvfBase* parent)
-    : KinetraListKvf(kForcingLists, ActiveIn(ProcessTemplates::kOverland), parent) {}
-std::unique_ptr<KinetraForcingKvf> CKinetraForcingsOLKvf::NewItem() {
-  return std::make_unique<KinetraForcingKvf>("CKinetraForcingsOLItemKvf", this);
-}
+    : KinetraListKvf(kOverlandForcings, ActiveIn(ProcessTemplates::kOverland), parent) {}
 
 CKinetraConstantsSZKvf::CKinetraConstantsSZKvf(CYbSEKvfBase* parent)
-    : KinetraListKvf(kConstantLists, ActiveIn(ProcessTemplates::kSaturated), parent) {}
-std::unique_ptr<KinetraConstantKvf> CKinetraConstantsSZKvf::NewItem() {
-  return std::make_unique<KinetraConstantKvf>("CKinetraConstantsSZItemKvf", this);
-}
+    : KinetraListKvf(kLayerConstants, ActiveIn(ProcessTemplates::kSaturated), parent) {}
 
 CKinetraForcingsSZKvf::CKinetraForcingsSZKvf(CYbSEKvfBase* parent)
-    : KinetraListKvf(kForcingLists, ActiveIn(ProcessTemplates::kSaturated), parent) {}
-std::unique_ptr<KinetraForcingKvf> CKinetraForcingsSZKvf::NewItem() {
-  return std::make_unique<KinetraForcingKvf>("CKinetraForcingsSZItemKvf", this);
-}
+    : KinetraListKvf(kLayerForcings, ActiveIn(ProcessTemplates::kSaturated), parent) {}
 
 CKinetraConstantsUZKvf::CKinetraConstantsUZKvf(CYbSEKvfBase* parent)
-    : KinetraListKvf(kConstantLists, ActiveIn(ProcessTemplates::kUnsaturated), parent) {}
-std::unique_ptr<CKinetraConstantsUZWQLayerListKvf> CKinetraConstantsUZKvf::NewItem() {
-  return std::make_unique<CKinetraConstantsUZWQLayerListKvf>(this);
-}
+    : KinetraListKvf(kSoilConstants, ActiveIn(ProcessTemplates::kUnsaturated), parent) {}
 
 CKinetraForcingsUZKvf::CKinetraForcingsUZKvf(CYbSEKvfBase* parent)
-    : KinetraListKvf(kForcingLists, ActiveIn(ProcessTemplates::kUnsaturated), parent) {}
-std::unique_ptr<CKinetraForcingsUZWQLayerListKvf> CKinetraForcingsUZKvf::NewItem() {
-  return std::make_unique<CKinetraForcingsUZWQLayerListKvf>(this);
-}
+    : KinetraListKvf(kSoilForcings, ActiveIn(ProcessTemplates::kUnsaturated), parent) {}
 
 }  // namespace tervane

@@ -8,6 +8,7 @@
 
 #include <memory>
 #include <string>
+#include <unordered_set>
 #include <vector>
 
 #include "core/named_item.h"
@@ -104,11 +105,11 @@ class KinetraSoilListKvf : public CYbSEKvfAbstractListBase<Layer>, public Kinetr
 
 class CKinetraConstantsUZWQLayerListKvf : public KinetraValue<KinetraSoilListKvf<CKinetraConstantsUZWQLayerItemKvf>> {
  public:
-  explicit CKinetraConstantsUZWQLayerListKvf(CYbSEKvfBase* parent);
+  CKinetraConstantsUZWQLayerListKvf(std::string_view className, CYbSEKvfBase* parent);
 };
 class CKinetraForcingsUZWQLayerListKvf : public KinetraValue<KinetraSoilListKvf<CKinetraForcingsUZWQLayerItemKvf>> {
  public:
-  explicit CKinetraForcingsUZWQLayerListKvf(CYbSEKvfBase* parent);
+  CKinetraForcingsUZWQLayerListKvf(std::string_view className, CYbSEKvfBase* parent);
 };
 
 // ---- The lists
@@ -118,63 +119,63 @@ struct KinetraListKind {
   const char* title;
   const char* section;
   const char* helpPage;
+  const char* itemClassName;
 };
 
 template <class Item>
 class KinetraListKvf : public CYbSEKvfAbstractListBase<Item>, public KinetraValueList {
  public:
+  /// `kind` must outlive the node: a constant.
   KinetraListKvf(const KinetraListKind& kind, Condition takesPart, CYbSEKvfBase* parent);
 
+  std::unique_ptr<Item> NewItem() override { return std::make_unique<Item>(itemClassName_, this); }
+
   std::vector<std::string> AppendMissing(const std::vector<std::string>& symbols) override {
+    std::unordered_set<std::string> there;
+    for (int number = 1; number <= this->GetItemCount(); ++number) there.insert(LowerCase(this->GetItem(number)->Name));
     std::vector<std::string> added;
     for (const std::string& symbol : symbols) {
-      bool isThere = false;
-      for (int number = 1; number <= this->GetItemCount(); ++number)
-        isThere = isThere || EqualIgnoringCase(this->GetItem(number)->Name, symbol);
-      if (isThere) continue;
+      if (!there.insert(LowerCase(symbol)).second) continue;
       this->AddItem()->Name = symbol;
       added.push_back(symbol);
     }
     return added;
   }
+
+ private:
+  std::string_view itemClassName_;
 };
 
 class CKinetraConstantsOLKvf : public KinetraListKvf<KinetraConstantKvf> {
  public:
   explicit CKinetraConstantsOLKvf(CYbSEKvfBase* parent);
-  std::unique_ptr<KinetraConstantKvf> NewItem() override;
 };
 inline constexpr ImportantName<CKinetraConstantsOLKvf> kKinetraConstantsOverland{"KINETRACONSTANTSOL"};
 
 class CKinetraForcingsOLKvf : public KinetraListKvf<KinetraForcingKvf> {
  public:
   explicit CKinetraForcingsOLKvf(CYbSEKvfBase* parent);
-  std::unique_ptr<KinetraForcingKvf> NewItem() override;
 };
 inline constexpr ImportantName<CKinetraForcingsOLKvf> kKinetraForcingsOverland{"KINETRAFORCINGSOL"};
 
 class CKinetraConstantsSZKvf : public KinetraListKvf<KinetraConstantKvf> {
  public:
   explicit CKinetraConstantsSZKvf(CYbSEKvfBase* parent);
-  std::unique_ptr<KinetraConstantKvf> NewItem() override;
 };
 class CKinetraForcingsSZKvf : public KinetraListKvf<KinetraForcingKvf> {
  public:
   explicit CKinetraForcingsSZKvf(CYbSEKvfBase* parent);
-  std::unique_ptr<KinetraForcingKvf> NewItem() override;
 };
 
 class CKinetraConstantsUZKvf : public KinetraListKvf<CKinetraConstantsUZWQLayerListKvf> {
  public:
   explicit CKinetraConstantsUZKvf(CYbSEKvfBase* parent);
-  std::unique_ptr<CKinetraConstantsUZWQLayerListKvf> NewItem() override;
 };
 inline constexpr ImportantName<CKinetraConstantsUZKvf> kKinetraConstantsSoil{"KINETRA_CONSTANTS_UZ"};
 
 class CKinetraForcingsUZKvf : public KinetraListKvf<CKinetraForcingsUZWQLayerListKvf> {
  public:
   explicit CKinetraForcingsUZKvf(CYbSEKvfBase* parent);
-  std::unique_ptr<CKinetraForcingsUZWQLayerListKvf> NewItem() override;
 };
 inline constexpr ImportantName<CKinetraForcingsUZKvf> kKinetraForcingsSoil{"KINETRA_FORCINGS_UZ"};
 

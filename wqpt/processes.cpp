@@ -75,8 +75,7 @@ int CProcessesWQ_DecayItemKvf::ValidateData() {
   if (!(WaterContentExponent >= 0)) return refuse(kExponent, "WaterContentExponent");
   if (Species.empty()) return refuse("Species can not be empty.", "Species");
   const auto* species = Important(kSpecies);
-  const auto isNamed = [this](const std::string& name) { return EqualIgnoringCase(name, Species); };
-  if (species && !std::ranges::any_of(species->Names(), isNamed))
+  if (species && !species->FindByName(Species))
     AddWarning("The process names a species that the setup does not have", "Species", Species);
   return 1;
 }
@@ -147,11 +146,9 @@ int CProcessesWQ_SorptionItemKvf::ValidateData() {
   if (Species.empty()) return refuse("Species can not be empty", "Species");
   if (SorbedSpecies.empty()) return refuse("Sorbed Species can not be empty", "SorbedSpecies");
   const auto* species = Important(kSpecies);
-  for (const auto& [name, key] : {std::pair{&Species, "Species"}, std::pair{&SorbedSpecies, "SorbedSpecies"}}) {
-    const auto isNamed = [&](const std::string& other) { return EqualIgnoringCase(other, *name); };
-    if (species && !std::ranges::any_of(species->Names(), isNamed))
+  for (const auto& [name, key] : {std::pair{&Species, "Species"}, std::pair{&SorbedSpecies, "SorbedSpecies"}})
+    if (species && !species->FindByName(*name))
       AddWarning("The process names a species that the setup does not have", key, *name);
-  }
   return 1;
 }
 

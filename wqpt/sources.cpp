@@ -4,7 +4,6 @@
 
 #include <algorithm>
 
-#include "platform/text.h"
 #include "simspec/conditions.h"
 #include "simspec/pages.h"
 #include "wqpt/pages.h"
@@ -90,8 +89,7 @@ int CSourceWQItemKvf::ValidateData() {
   else if (type->location != Location)
     AddWarning("The source has a type of the other location", "SourceType", std::string(type->text));
   const auto* species = Important(kSpecies);
-  const auto isNamed = [this](const std::string& name) { return EqualIgnoringCase(name, Species); };
-  if (species && !std::ranges::any_of(species->Names(), isNamed))
+  if (species && !species->FindByName(Species))
     AddWarning("The source names a species that the setup does not have", "Species", Species);
   return 1;
 }

@@ -93,7 +93,17 @@ CSpeciesListKvf::CSpeciesListKvf(CYbSEKvfBase* parent) : CTvnMasterList("Species
   TakesPartWhen(Component(&CModelCompKvf::WQ));
 }
 
-bool CSpeciesListKvf::HasSpeciesOfType(int type) const { return !NamesOfType(type).empty(); }
+bool CSpeciesListKvf::HasSpeciesOfType(int type) const {
+  for (int number = 1; number <= GetItemCount(); ++number)
+    if (GetItem(number)->Type == type) return true;
+  return false;
+}
+
+CSpeciesItemKvf* CSpeciesListKvf::FindByName(const std::string& name) const {
+  for (int number = 1; number <= GetItemCount(); ++number)
+    if (EqualIgnoringCase(GetItem(number)->GetName(), name)) return GetItem(number);
+  return nullptr;
+}
 
 std::string CSpeciesListKvf::GetItemName(int number) const {
   const CSpeciesItemKvf* item = GetItem(number);

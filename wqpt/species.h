@@ -62,7 +62,9 @@ class CSpeciesListKvf : public CTvnMasterList<CSpeciesItemKvf, CSpeciesListBase>
 
   bool HasSpeciesOfType(int type) const override;
   std::string GetItemName(int number) const override;
-  /// The names in the order of the list, of all species or of those that a function takes.
+  /// The first species of that name, in any case; null where there is none.
+  CSpeciesItemKvf* FindByName(const std::string& name) const;
+  /// The names in the order of the list, of all species or of those of a type.
   std::vector<std::string> Names() const;
   std::vector<std::string> NamesOfType(int type) const;
   std::vector<std::string> NamesWithoutType(int type) const;

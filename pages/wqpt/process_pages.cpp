@@ -3,7 +3,6 @@
 #include "pages/wqpt/process_pages.h"
 
 #include "forms/table_of.h"
-#include "platform/text.h"
 #include "simspec/conditions.h"
 #include "wqpt/pages.h"
 #include "wqpt/processes.h"
@@ -22,9 +21,7 @@ CellChoices SpeciesChoices(std::vector<std::string> names) {
 template <class Item>
 std::string PresentSpecies(const Item& item, const std::string& name) {
   const auto* species = item.Important(kSpecies);
-  const std::vector<std::string> names = species ? species->Names() : std::vector<std::string>();
-  const auto isIt = [&name](const std::string& other) { return EqualIgnoringCase(other, name); };
-  return std::ranges::any_of(names, isIt) ? name : std::string();
+  return species && species->FindByName(name) ? name : std::string();
 }
 
 template <class Item>
