@@ -24,11 +24,15 @@ class CSpeciesDlg : public PageOf<CSpeciesListKvf> {
  public:
   using PageOf::PageOf;
 
-  void SetData() override { matrix_ = MatrixOfSpecies(*Node().GetRoot()); }
+  void SetData() override { isCurrent_ = false; }
+  /// Computed when it is asked for: a page may be made for its labels alone.
+  SpeciesMatrix& Matrix() {
+    if (!std::exchange(isCurrent_, true)) matrix_ = MatrixOfSpecies(*Node().GetRoot());
+    return matrix_;
+  }
 
  protected:
   void Describe(PageForm& form) override {
-    SetData();
     DescribeSpecies(form);
     DescribeMatrix(form);
   }
@@ -41,6 +45,7 @@ class CSpeciesDlg : public PageOf<CSpeciesListKvf> {
 
   std::shared_ptr<TableOf<CSpeciesItemKvf>> table_;
   SpeciesMatrix matrix_;
+  bool isCurrent_ = false;
 };
 
 /// The name, with a number behind it where it is taken.
@@ -56,21 +61,22 @@ std::string FreeName(const std::vector<std::string>& taken, const std::string& n
 /// Rows that nobody changes.
 class MatrixRows : public RowsOf<SpeciesRow> {
  public:
-  explicit MatrixRows(SpeciesMatrix& matrix) : matrix_(matrix) {}
+  explicit MatrixRows(CSpeciesDlg& page) : page_(page) {}
 
-  int Count() const override { return static_cast<int>(matrix_.rows.size()); }
-  SpeciesRow& At(int row) const override { return matrix_.rows[static_cast<std::size_t>(row) - 1]; }
+  int Count() const override { return static_cast<int>(page_.Matrix().rows.size()); }
+  SpeciesRow& At(int row) const override { return page_.Matrix().rows[static_cast<std::size_t>(row) - 1]; }
 
  private:
-  SpeciesMatrix& matrix_;
+  CSpeciesDlg& page_;
 };
 
 void CSpeciesDlg::DescribeMatrix(PageForm& form) {
-  auto table = std::make_shared<TableOf<SpeciesRow>>(std::make_shared<MatrixRows>(matrix_));
+  auto table = std::make_shared<TableOf<SpeciesRow>>(std::make_shared<MatrixRows>(*this));
   table->Value("Species", [](const SpeciesRow& row) { return row.name; }).Key("Name").Width(110);
-  for (std::size_t place = 0; place < matrix_.places.size(); ++place) {
+  const std::vector<std::string> places = PlacesOfSpecies();
+  for (std::size_t place = 0; place < places.size(); ++place) {
     // Two words, one above the other.
-    std::string head = matrix_.places[place];
+    std::string head = places[place];
     std::ranges::replace(head, ' ', '\n');
     table->Value(head, [place](const SpeciesRow& row) { return SpeciesUseText(row.uses[place]); })
         .Key("Include")
@@ -88,11 +94,11 @@ void CSpeciesDlg::DescribeMatrix(PageForm& form) {
   group
       .Notice([this] {
         std::vector<std::string> names;
-        for (const auto& [name, node] : matrix_.withoutSpecies) names.push_back(name);
+        for (const auto& [name, node] : Matrix().withoutSpecies) names.push_back(name);
         return fmt::format("No species of the setup is named by {}", fmt::join(names, "; "));
       })
       .ShownWhen("a process or source names no species of the setup",
-                 [this] { return !matrix_.withoutSpecies.empty(); });
+                 [this] { return !Matrix().withoutSpecies.empty(); });
 }
 
 void CSpeciesDlg::AddMetabolite(const CSpeciesItemKvf& parent) {

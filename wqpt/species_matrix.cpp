@@ -127,9 +127,15 @@ std::string SpeciesUseText(const SpeciesUse& use) {
   return use.names.empty() ? std::string(state) : fmt::format("{}: {}", state, fmt::join(use.names, ", "));
 }
 
+std::vector<std::string> PlacesOfSpecies() {
+  std::vector<std::string> places;
+  for (const Place& place : kPlaces) places.emplace_back(place.title);
+  return places;
+}
+
 SpeciesMatrix MatrixOfSpecies(CYbSEKvfBase& root) {
   SpeciesMatrix matrix;
-  for (const Place& place : kPlaces) matrix.places.emplace_back(place.title);
+  matrix.places = PlacesOfSpecies();
   auto* species = root.Important(kSpecies);
   for (int number = 1; species && number <= species->GetItemCount(); ++number)
     matrix.rows.push_back({species->GetItemName(number), std::vector<SpeciesUse>(std::size(kPlaces))});

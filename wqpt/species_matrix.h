@@ -39,5 +39,7 @@ struct SpeciesMatrix {
   std::vector<std::pair<std::string, CYbSEKvfBase*>> withoutSpecies;
 };
 SpeciesMatrix MatrixOfSpecies(CYbSEKvfBase& root);
+/// The titles of the places, whatever the setup.
+std::vector<std::string> PlacesOfSpecies();
 
 }  // namespace tervane
