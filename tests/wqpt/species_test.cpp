@@ -73,5 +73,20 @@ TEST(Species, WhatIsRefused) {
   EXPECT_THAT(setup.ErrorsAt("Species"), ElementsAre());
 }
 
+TEST(Species, ASetupOfVersionTenWithMassOnTheGroundIsToBeLookedAt) {
+  const auto warns = [](int version, int overland) {
+    QualitySetup setup("section SimSpec { section ModelComp { WQ = 1; } } section ModelCompWQ { OL = " +
+                           std::to_string(overland) + "; }",
+                       version);
+    return std::ranges::any_of(setup.Report().entries, [](const LoadReport::Entry& entry) {
+      return entry.kind == LoadReport::Kind::Warning && entry.text.find("Release 2007") != std::string::npos;
+    });
+  };
+  EXPECT_TRUE(warns(10, 1));
+  EXPECT_FALSE(warns(10, 0));
+  EXPECT_FALSE(warns(9, 1));
+  EXPECT_FALSE(warns(11, 1));
+}
+
 }  // namespace
 }  // namespace tervane
