@@ -16,7 +16,7 @@
 #include "surface/vegetation.h"
 #include "tests/support/command_outcome.h"
 
-namespace tervane {
+namespace tervane::check_command_test {
 namespace {
 
 const std::string kFolder = TERVANE_SOURCE_DIR "/examples/rhone/";
@@ -168,4 +168,4 @@ TEST(CheckCommand, InfoTellsOfPointsAndShapes) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::check_command_test

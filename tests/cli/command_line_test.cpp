@@ -17,7 +17,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::command_line_test {
 namespace {
 
 using test::ReadFile;
@@ -480,4 +480,4 @@ TEST_F(CommandLine, TreeAndPageShowWhatThePreprocessorLeft) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::command_line_test

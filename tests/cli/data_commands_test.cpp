@@ -14,7 +14,7 @@
 #include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::data_commands_test {
 namespace {
 
 using test::ReadFile;
@@ -352,4 +352,4 @@ TEST(DataCommands, InfoTellsTheEntriesOfALibrary) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::data_commands_test

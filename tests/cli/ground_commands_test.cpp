@@ -7,7 +7,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::ground_commands_test {
 namespace {
 
 using test::SetupText;
@@ -83,4 +83,4 @@ TEST(GroundCommands, WhatCannotBeCutIsTold) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::ground_commands_test

@@ -9,7 +9,7 @@
 #include "tests/support/command_outcome.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::river_commands_test {
 namespace {
 
 using test::ReadFile;
@@ -86,4 +86,4 @@ TEST_F(RiverCommands, FaultsAreFindingsWithTheirPlace) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::river_commands_test

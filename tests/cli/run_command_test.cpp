@@ -9,7 +9,7 @@
 #include "tests/support/engine_script.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::run_command_test {
 namespace {
 
 using testing::HasSubstr;
@@ -75,4 +75,4 @@ TEST_F(RunCommand, ARunThatDidNotBeginCouldNotBeDone) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::run_command_test

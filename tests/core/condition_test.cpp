@@ -7,7 +7,7 @@
 
 #include "core/node.h"
 
-namespace tervane {
+namespace tervane::condition_test {
 namespace {
 
 using testing::ElementsAre;
@@ -98,4 +98,4 @@ TEST(Condition, OfANodeDecidesWhetherItTakesPart) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::condition_test

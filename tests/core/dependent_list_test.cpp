@@ -9,7 +9,7 @@
 
 #include "tests/core/node_tree.h"
 
-namespace tervane {
+namespace tervane::dependent_list_test {
 namespace {
 
 using test::LoadText;
@@ -271,4 +271,4 @@ TEST_F(DependentList, ARefreshReachesAllDependentsAndThenWhoListens) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::dependent_list_test

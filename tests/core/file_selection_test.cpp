@@ -7,7 +7,7 @@
 #include "core/kvf_parser.h"
 #include "core/kvf_writer.h"
 
-namespace tervane {
+namespace tervane::file_selection_test {
 namespace {
 
 using testing::ElementsAre;
@@ -69,4 +69,4 @@ TEST(FileSelection, TakesNoMoreItemsThanAreCountedAndNoneOfAnotherType) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::file_selection_test

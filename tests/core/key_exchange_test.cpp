@@ -11,7 +11,7 @@
 #include "core/list.h"
 #include "tests/core/node_tree.h"
 
-namespace tervane {
+namespace tervane::key_exchange_test {
 namespace {
 
 using test::LoadText;
@@ -154,4 +154,4 @@ TEST(KeyExchange, ValuesAtTheEdgeAreReadAndTold) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::key_exchange_test

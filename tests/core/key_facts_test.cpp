@@ -9,7 +9,7 @@
 
 #include "core/node.h"
 
-namespace tervane {
+namespace tervane::key_facts_test {
 namespace {
 
 using testing::ElementsAre;
@@ -107,4 +107,4 @@ TEST(KeyFacts, OfStrayValuesBecomeFindings) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::key_facts_test

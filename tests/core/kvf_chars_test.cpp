@@ -6,7 +6,7 @@
 
 #include <gtest/gtest.h>
 
-namespace tervane {
+namespace tervane::kvf_chars_test {
 namespace {
 
 /// How many of the eight characters, from the first on, are of a class by the table.
@@ -60,4 +60,4 @@ TEST(KvfChars, AWordEndsBehindItsLastCharacter) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::kvf_chars_test

@@ -11,7 +11,7 @@
 #include "tests/core/parsed.h"
 #include "tests/support/split_at_arrow.h"
 
-namespace tervane {
+namespace tervane::kvf_parser_test {
 namespace {
 
 using test::Parsed;
@@ -229,4 +229,4 @@ TEST(KvfParser, ManyTextsWithEscapesInOneKeywordTakeMemoryInProportion) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::kvf_parser_test

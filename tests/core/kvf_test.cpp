@@ -14,7 +14,7 @@
 #include "tests/support/split_at_arrow.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::kvf_test {
 namespace {
 
 using test::Parsed;
@@ -358,4 +358,4 @@ TEST(Kvf, ResultsLieInTheCustomFolderElseBelowTheRootElseBesideTheFile) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::kvf_test

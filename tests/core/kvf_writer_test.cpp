@@ -13,7 +13,7 @@
 
 #include "tests/core/parsed.h"
 
-namespace tervane {
+namespace tervane::kvf_writer_test {
 namespace {
 
 using test::Parsed;
@@ -104,4 +104,4 @@ TEST(KvfWriter, WhatCouldNotBeReadAgainIsNotWritten) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::kvf_writer_test

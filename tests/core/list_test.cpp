@@ -8,7 +8,7 @@
 
 #include "tests/core/node_tree.h"
 
-namespace tervane {
+namespace tervane::list_test {
 namespace {
 
 using test::LoadText;
@@ -309,4 +309,4 @@ TEST(List, ItemsDieFromTheTail) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::list_test

@@ -8,7 +8,7 @@
 #include "core/walked_node.h"
 #include "tests/core/node_tree.h"
 
-namespace tervane {
+namespace tervane::node_test {
 namespace {
 
 using test::LoadText;
@@ -316,4 +316,4 @@ TEST(Node, APathLeadsToANode) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::node_test

@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::path_test {
 namespace {
 
 using testing::HasSubstr;
@@ -74,4 +74,4 @@ TEST(Path, WhatIsNoPathIsToldWhy) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::path_test

@@ -6,7 +6,7 @@
 
 #include <gtest/gtest.h>
 
-namespace tervane {
+namespace tervane::state_buffer_test {
 namespace {
 
 std::uint64_t FingerprintOf(const auto&... values) {
@@ -53,4 +53,4 @@ TEST(StateFingerprint, ValuesCountWithTheirPlacesAndBits) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::state_buffer_test

@@ -17,7 +17,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::undo_test {
 namespace {
 
 using test::PageDriver;
@@ -379,4 +379,4 @@ TEST(Undo, ARandomWalkKeepsLinksInEveryDependent) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::undo_test

@@ -6,7 +6,7 @@
 
 #include "platform/dates.h"
 
-namespace tervane {
+namespace tervane::cf_time_test {
 namespace {
 
 TEST(CfTime, NumbersMeanMoments) {
@@ -73,4 +73,4 @@ TEST(CfTime, WhatTellsNoMomentsIsRefusedWithAReason) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::cf_time_test

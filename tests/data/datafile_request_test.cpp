@@ -7,7 +7,7 @@
 #include "data/datafile_writer.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::datafile_request_test {
 namespace {
 
 using Period = DataFileRequest::Period;
@@ -81,4 +81,4 @@ TEST(DataFileRequest, WhatNoQuantityOrGridCanBeMadeOfIsRefused) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::datafile_request_test

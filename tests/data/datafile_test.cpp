@@ -12,7 +12,7 @@
 #include "platform/item_types.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::datafile_test {
 namespace {
 
 using test::ReadFile;
@@ -322,4 +322,4 @@ TEST_F(ForeignFile, ManyThreadsReadAtOnce) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::datafile_test

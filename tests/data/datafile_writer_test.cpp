@@ -9,7 +9,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::datafile_writer_test {
 namespace {
 
 using test::ReadFile;
@@ -309,4 +309,4 @@ TEST_F(DataFileWriterTest, LargeGridsGoInPiecesAndWhatIsCancelledLeavesTheOldFil
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::datafile_writer_test

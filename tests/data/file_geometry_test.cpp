@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::file_geometry_test {
 namespace {
 
 using testing::HasSubstr;
@@ -119,4 +119,4 @@ TEST(FileGeometry, BecomesTheGridOfAModelWhereItsCellsAreSquares) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::file_geometry_test

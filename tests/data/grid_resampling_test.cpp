@@ -9,7 +9,7 @@
 
 #include "data/datafile.h"
 
-namespace tervane {
+namespace tervane::grid_resampling_test {
 namespace {
 
 using testing::ElementsAre;
@@ -175,4 +175,4 @@ TEST_F(Resampled, PlacesGoThroughTheProjections) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::grid_resampling_test

@@ -16,7 +16,7 @@
 #include "platform/item_types.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::raster_file_test {
 namespace {
 
 using testing::ElementsAre;
@@ -194,4 +194,4 @@ TEST(RasterFile, AGeoTiffThatCannotBeWrittenLeavesTheOldFile) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::raster_file_test

@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::series_csv_test {
 namespace {
 
 using testing::ElementsAre;
@@ -96,4 +96,4 @@ TEST(SeriesCsv, WhatCannotBeReadIsToldWithItsLine) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::series_csv_test

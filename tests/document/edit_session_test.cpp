@@ -15,7 +15,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::edit_session_test {
 namespace {
 
 namespace fs = std::filesystem;
@@ -432,4 +432,4 @@ TEST_F(EditSessionTest, ChangesThatNoFileStandsForAreRecoveredAsANewSetup) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::edit_session_test

@@ -14,7 +14,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::flow_model_document_test {
 namespace {
 
 using test::ReadFile;
@@ -263,4 +263,4 @@ TEST_F(FlowModelDocument, AFailedSaveLeavesTheFileAndTheDocumentAsTheyWere) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::flow_model_document_test

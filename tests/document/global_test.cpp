@@ -11,7 +11,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::global_test {
 namespace {
 
 namespace fs = std::filesystem;
@@ -139,4 +139,4 @@ TEST(Global, AFileOfVersion1HoldsTheStoringOfResultsInSimSpec) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::global_test

@@ -10,7 +10,7 @@
 #include "core/kvf_writer.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::key_reference_test {
 namespace {
 
 using test::SavedText;
@@ -239,4 +239,4 @@ TEST(KeyReference, TellsInWhichVersionsAnOldKeyIsRead) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::key_reference_test

@@ -11,7 +11,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::recovery_test {
 namespace {
 
 namespace fs = std::filesystem;
@@ -143,4 +143,4 @@ TEST_F(RecoveryTest, TheFolderIsSearchedAndTheNewestComesFirst) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::recovery_test

@@ -6,7 +6,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::river_simulation_file_test {
 namespace {
 
 using test::ReadFile;
@@ -83,4 +83,4 @@ TEST(RiverSimulationFile, AFileThatCannotBeReadStaysAsItWas) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::river_simulation_file_test

@@ -8,7 +8,7 @@
 #include "core/kvf_parser.h"
 #include "core/list.h"
 
-namespace tervane {
+namespace tervane::saturated_zone_reload_test {
 namespace {
 
 /// Tells each reading as SECTION, with the value that was read.
@@ -90,4 +90,4 @@ TEST(SaturatedZoneReload, ReadsTheZoneAndTheLayersOnceMoreWithoutListsAndInterna
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::saturated_zone_reload_test

@@ -7,7 +7,7 @@
 
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::setup_diff_test {
 namespace {
 
 using test::SetupText;
@@ -75,4 +75,4 @@ TEST(SetupDiff, FollowsTheItemsOfAList) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::setup_diff_test

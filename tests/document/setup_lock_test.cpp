@@ -15,7 +15,7 @@
 #include "platform/os.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::setup_lock_test {
 namespace {
 
 namespace fs = std::filesystem;
@@ -160,4 +160,4 @@ TEST_F(Lock, TellsWhyItCannotBeWritten) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::setup_lock_test

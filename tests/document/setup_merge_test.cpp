@@ -6,7 +6,7 @@
 
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::setup_merge_test {
 namespace {
 
 using test::SetupText;
@@ -103,4 +103,4 @@ TEST(SetupMerge, WhatIsNoValueOfBothIsNotTaken) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::setup_merge_test

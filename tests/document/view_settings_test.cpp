@@ -7,7 +7,7 @@
 
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::view_settings_test {
 namespace {
 
 using test::SetupText;
@@ -55,4 +55,4 @@ TEST(ViewSettings, WritesTheAreasOfTheRoot) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::view_settings_test

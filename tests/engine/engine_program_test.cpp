@@ -9,8 +9,8 @@
 #include "core/kvf.h"
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
-#include "engine/model_layers.h"
 #include "execution/execute_flags.h"
+#include "engine/model_layers.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
 #include "simspec/model_components.h"
@@ -33,7 +33,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::engine_program_test {
 namespace {
 
 using testing::Each;
@@ -384,4 +384,4 @@ TEST_F(EngineProgram, RefusesWhatItCannotDo) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::engine_program_test

@@ -7,7 +7,7 @@
 
 #include "tests/support/split_at_arrow.h"
 
-namespace tervane {
+namespace tervane::engine_line_test {
 namespace {
 
 std::string Understood(const std::string& line) {
@@ -46,4 +46,4 @@ TEST(EngineLine, IsUnderstoodByItsForm) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::engine_line_test

@@ -7,7 +7,7 @@
 #include "tests/support/engine_script.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::engine_search_test {
 namespace {
 
 using testing::AllOf;
@@ -42,4 +42,4 @@ TEST(EngineSearch, TellsWhereItHasLookedAndWhatMayNotBeStarted) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::engine_search_test

@@ -14,7 +14,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::processed_data_test {
 namespace {
 
 namespace fs = std::filesystem;
@@ -182,4 +182,4 @@ TEST(ProcessedData, AHundredThousandPagesAreBuilt) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::processed_data_test

@@ -11,7 +11,7 @@
 #include "tests/support/preprocessed_run.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::processed_river_test {
 namespace {
 
 using test::RiverBytes;
@@ -136,4 +136,4 @@ TEST(ProcessedRiver, BranchesBeginAtFlagThree) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::processed_river_test

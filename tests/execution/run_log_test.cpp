@@ -10,7 +10,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::run_log_test {
 namespace {
 
 std::string Lines(const LogPiece& piece) {
@@ -79,4 +79,4 @@ TEST(RunLog, AFileThatBeginsAnewIsReadFromItsBeginning) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::run_log_test

@@ -17,7 +17,7 @@
 #include "tests/support/engine_script.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::setup_run_test {
 namespace {
 
 using namespace std::chrono_literals;
@@ -299,4 +299,4 @@ TEST(RunState, DurationsAreToldAsPeopleTellThem) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::setup_run_test

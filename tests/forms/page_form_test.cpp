@@ -7,7 +7,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::page_form_test {
 namespace {
 
 using test::PageDriver;
@@ -164,4 +164,4 @@ TEST(PageForm, AQuantityIsShownAndTypedInTheUsersUnit) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::page_form_test

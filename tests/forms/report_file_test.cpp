@@ -6,7 +6,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::report_file_test {
 namespace {
 
 using testing::HasSubstr;
@@ -40,4 +40,4 @@ TEST(ReportFile, WhatCannotBeShownIsToldInWords) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::report_file_test

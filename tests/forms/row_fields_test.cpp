@@ -8,7 +8,7 @@
 #include "simspec/extra_params.h"
 #include "tests/support/table_page.h"
 
-namespace tervane {
+namespace tervane::row_fields_test {
 namespace {
 
 class FieldsOfARow : public testing::Test {
@@ -105,4 +105,4 @@ TEST_F(FieldsOfARow, FollowAnItemThatAnotherPageMoved) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::row_fields_test

@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::section_profile_test {
 namespace {
 
 using testing::DoubleNear;
@@ -62,4 +62,4 @@ TEST(SectionProfile, WithoutALineOrGroundThereIsNothing) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::section_profile_test

@@ -6,7 +6,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::series_views_test {
 namespace {
 
 using testing::DoubleNear;
@@ -58,4 +58,4 @@ TEST(SeriesViews, GapsReachFromValueToValue) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::series_views_test

@@ -10,7 +10,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::table_form_test {
 namespace {
 
 using test::PageDriver;
@@ -231,4 +231,4 @@ TEST_F(ExtraParamsTable, ANumberColumnWithAUnitIsShownAndTypedInIt) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::table_form_test

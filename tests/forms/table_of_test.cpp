@@ -9,7 +9,7 @@
 #include "document/flow_model_document.h"
 #include "tests/support/table_page.h"
 
-namespace tervane {
+namespace tervane::table_of_test {
 namespace {
 
 using testing::ElementsAre;
@@ -157,4 +157,4 @@ TEST_F(PlainTable, ValuesAreInsertedDeletedAndMovedUnlessTheyAreToStay) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::table_of_test

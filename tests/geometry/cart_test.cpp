@@ -11,7 +11,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::cart_test {
 namespace {
 
 using testing::HasSubstr;
@@ -118,4 +118,4 @@ TEST(ProjectionFile, IsReadOrRefused) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::cart_test

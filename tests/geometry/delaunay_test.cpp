@@ -9,7 +9,7 @@
 
 #include <gtest/gtest.h>
 
-namespace tervane {
+namespace tervane::delaunay_test {
 namespace {
 
 using Points = std::vector<LatticePoint>;
@@ -123,4 +123,4 @@ TEST(Delaunay, StopsWhenCancelled) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::delaunay_test

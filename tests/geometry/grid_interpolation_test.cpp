@@ -15,7 +15,7 @@
 #include "geometry/shapes.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::grid_interpolation_test {
 namespace {
 
 using testing::Each;
@@ -373,4 +373,4 @@ TEST(Interpolation, ReadsPointsOfFilesInTheirUnits) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::grid_interpolation_test

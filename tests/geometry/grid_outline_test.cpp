@@ -6,7 +6,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::grid_outline_test {
 namespace {
 
 constexpr float kEmpty = -99;
@@ -72,4 +72,4 @@ TEST(GridOutline, TurnsWithTheGrid) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::grid_outline_test

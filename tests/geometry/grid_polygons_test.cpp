@@ -12,7 +12,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::grid_polygons_test {
 namespace {
 
 using testing::ElementsAre;
@@ -242,4 +242,4 @@ TEST_F(PolygonFiles, MakeADomain) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::grid_polygons_test

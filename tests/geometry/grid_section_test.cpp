@@ -7,7 +7,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::grid_section_test {
 namespace {
 
 using testing::DoubleNear;
@@ -103,4 +103,4 @@ TEST(GridSection, AnEmptyNeighbourLeavesItsWeightToTheOthersAndItsOwnCellIsAGap)
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::grid_section_test

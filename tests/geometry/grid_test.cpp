@@ -12,7 +12,7 @@
 #include "platform/item_types.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::grid_test {
 namespace {
 
 using testing::ElementsAre;
@@ -150,4 +150,4 @@ TEST(GridText, TellsWhatIsWrongAndWhere) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::grid_test

@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::level_test {
 namespace {
 
 using testing::ElementsAre;
@@ -47,4 +47,4 @@ TEST(Level, AThicknessIsThatOfTheLowestLayerAndNeverNegative) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::level_test

@@ -6,7 +6,7 @@
 
 #include "geometry/cart.h"
 
-namespace tervane {
+namespace tervane::projection_list_test {
 namespace {
 
 std::vector<std::string> Codes(std::string_view typed, std::size_t most) {
@@ -39,4 +39,4 @@ TEST(ProjectionList, ATextByItsCodeIsTheSystem) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::projection_list_test

@@ -6,7 +6,7 @@
 
 #include <gtest/gtest.h>
 
-namespace tervane {
+namespace tervane::ring_faults_test {
 namespace {
 
 TEST(RingFaults, AreToldByTheirPlace) {
@@ -49,4 +49,4 @@ TEST(RingFaults, OfALongRingAreFound) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::ring_faults_test

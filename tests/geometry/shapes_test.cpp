@@ -11,7 +11,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::shapes_test {
 namespace {
 
 using testing::ElementsAre;
@@ -269,4 +269,4 @@ TEST(Shapes, HaveValuesAsTexts) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::shapes_test

@@ -5,7 +5,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-namespace tervane {
+namespace tervane::xyz_text_test {
 namespace {
 
 using testing::ElementsAre;
@@ -52,4 +52,4 @@ TEST(XyzText, TellsTheLineOfWhatIsWrong) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::xyz_text_test

@@ -8,7 +8,7 @@
 #include "libraries/vegetations.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::library_test {
 namespace {
 
 using testing::ElementsAre;
@@ -212,4 +212,4 @@ TEST(LibraryKinds, AreKnownByTheExtension) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::library_test

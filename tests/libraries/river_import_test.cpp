@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::river_import_test {
 namespace {
 
 using testing::ElementsAre;
@@ -143,4 +143,4 @@ TEST_F(RiverImportTest, APointFarFromAllOthersTakesNoTime) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::river_import_test

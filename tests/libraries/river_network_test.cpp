@@ -7,7 +7,7 @@
 #include "platform/paths.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::river_network_test {
 namespace {
 
 using test::ReadFile;
@@ -249,4 +249,4 @@ TEST(RiverNetwork, ANewOneHasTheSectionsOfItsEditor) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::river_network_test

@@ -8,7 +8,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::soils_test {
 namespace {
 
 using testing::DoubleNear;
@@ -133,4 +133,4 @@ TEST(Soils, AreFoundInTheirFileByName) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::soils_test

@@ -6,7 +6,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::wells_test {
 namespace {
 
 TEST(Wells, AnEmptyFileHasTheAreaAndTheSectionsOfItsEditor) {
@@ -132,4 +132,4 @@ TEST(Wells, ATableOfTextGivesWellsAndTellsWhatItDoesNotTake) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::wells_test

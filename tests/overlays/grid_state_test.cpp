@@ -8,7 +8,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::grid_state_test {
 namespace {
 
 using testing::HasSubstr;
@@ -64,4 +64,4 @@ TEST_F(GridState, AsksBeforeItReplacesAnother) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::grid_state_test

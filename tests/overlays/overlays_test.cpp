@@ -6,7 +6,7 @@
 
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::overlays_test {
 namespace {
 
 using test::SetupText;
@@ -71,4 +71,4 @@ TEST(Overlays, TheShownAreaFollowsTheDomainOrStays) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::overlays_test

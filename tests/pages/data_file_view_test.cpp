@@ -9,7 +9,7 @@
 #include "data/datafile_writer.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::data_file_view_test {
 namespace {
 
 using test::TempFolder;
@@ -150,4 +150,4 @@ TEST(DataFileView, FollowsTheFileOnTheDisk) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::data_file_view_test

@@ -8,7 +8,7 @@
 #include "document/flow_model_document.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::findings_test {
 namespace {
 
 TEST(Findings, OfAllOriginsStandInOneListAndLeadToTheirNodes) {
@@ -91,4 +91,4 @@ TEST(Findings, WhatAnEngineSaysOfAKeyJoinsTheFindingThatIsThere) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::findings_test

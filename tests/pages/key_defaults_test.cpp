@@ -7,7 +7,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::key_defaults_test {
 namespace {
 
 using test::PageDriver;
@@ -67,4 +67,4 @@ TEST(KeyDefaults, TheToolTipTellsDefaultRangeUnitAndKey) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::key_defaults_test

@@ -11,7 +11,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::library_editor_test {
 namespace {
 
 using testing::HasSubstr;
@@ -150,4 +150,4 @@ TEST(EditedSoils, AModelThatIsChosenIsReadAgainAndTheRefusedLineStaysAsAComment)
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::library_editor_test

@@ -13,7 +13,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::page_table_test {
 namespace {
 
 namespace fs = std::filesystem;
@@ -123,4 +123,4 @@ TEST(PageTable, EveryControlTakesItsOwnText) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::page_table_test

@@ -8,7 +8,7 @@
 #include "document/flow_model_document.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::search_test {
 namespace {
 
 using testing::Contains;
@@ -77,4 +77,4 @@ TEST(Search, TheBestComesFirstAndLeadsToItsControl) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::search_test

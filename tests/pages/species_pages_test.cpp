@@ -11,7 +11,7 @@
 #include "wqpt/processes.h"
 #include "wqpt/sources.h"
 
-namespace tervane {
+namespace tervane::species_pages_test {
 namespace {
 
 using testing::ElementsAre;
@@ -84,4 +84,4 @@ TEST_F(SpeciesPages, ATypeTellsWhichCellsCountAndWhereTheSpeciesTakesPart) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::species_pages_test

@@ -11,7 +11,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::summary_test {
 namespace {
 
 using test::PageDriver;
@@ -77,4 +77,4 @@ TEST(Summary, OfAnEmptyOrFaultySetupSaysSo) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::summary_test

@@ -10,7 +10,7 @@
 #include "document/flow_model_document.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::tree_entries_test {
 namespace {
 
 constexpr PageClass kSomePage{"CSomeDlg", 1};
@@ -67,4 +67,4 @@ TEST(TreeEntries, AreTheNodesOfASetupThatTakePartAndHaveAPageUnderTheirPaths) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::tree_entries_test

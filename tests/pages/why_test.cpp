@@ -8,7 +8,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::why_test {
 namespace {
 
 using testing::Contains;
@@ -101,4 +101,4 @@ TEST(Why, WhatIsMissingTellsEachBranchOnce) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::why_test

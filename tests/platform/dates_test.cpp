@@ -9,7 +9,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::dates_test {
 namespace {
 
 constexpr const char* kFull = "%Y/%m/%d %H:%M:%S";
@@ -108,4 +108,4 @@ TEST(Dates, ValidDatesSortByTimeBehindAllInvalidOnes) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::dates_test

@@ -8,7 +8,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::file_cache_test {
 namespace {
 
 using std::chrono::seconds;
@@ -66,4 +66,4 @@ TEST_F(FileCaches, ForgetWhatNobodyAskedForLongest) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::file_cache_test

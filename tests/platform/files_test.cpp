@@ -25,7 +25,7 @@
 #include "platform/os.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::files_test {
 namespace {
 
 namespace fs = std::filesystem;
@@ -352,4 +352,4 @@ TEST(Process, KnowsItselfAndItsMemory) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::files_test

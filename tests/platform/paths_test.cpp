@@ -9,7 +9,7 @@
 
 #include "tests/support/split_at_arrow.h"
 
-namespace tervane {
+namespace tervane::paths_test {
 namespace {
 
 using test::SplitAtArrow;
@@ -87,4 +87,4 @@ TEST(Paths, NativePathsGoBackAndForth) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::paths_test

@@ -6,7 +6,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::text_pieces_test {
 namespace {
 
 std::string ReadAll(TextPieces& pieces, std::size_t bytes) {
@@ -59,4 +59,4 @@ TEST(TextPieces, WhatIsNoFileIsRefusedAndSaid) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::text_pieces_test

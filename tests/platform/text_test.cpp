@@ -7,7 +7,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::text_test {
 namespace {
 
 TEST(Text, IsTrimmedComparedAndReplaced) {
@@ -91,4 +91,4 @@ TEST(Text, NumbersAreWrittenInTheirShortestForm) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::text_test

@@ -26,7 +26,7 @@
 /// The C library's setlocale never frees the folders of LOCPATH, which the leak sanitizer sees or not by chance.
 extern "C" const char* __lsan_default_suppressions() { return "leak:__argz_add_sep\n"; }
 
-namespace tervane {
+namespace tervane::units_test {
 namespace {
 
 const ItemType& Item(int code) {
@@ -401,4 +401,4 @@ TEST_F(UnitsInAFreshProcess, WithoutItsDatabaseTheTableStillServes) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::units_test

@@ -10,7 +10,7 @@
 #include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
 
-namespace tervane {
+namespace tervane::compare_view_test {
 namespace {
 
 using test::OpenedSetup;
@@ -78,4 +78,4 @@ TEST(CompareView, AValueIsTakenFromTheOtherSetupAndUndoTakesItBack) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::compare_view_test

@@ -26,7 +26,7 @@
 #include "tests/shell/opened_setup.h"
 #include "tests/support/preprocessed_run.h"
 
-namespace tervane {
+namespace tervane::document_frame_test {
 namespace {
 
 using test::OpenedSetup;
@@ -346,4 +346,4 @@ TEST(DocumentFrame, AReportThatChangesOnDiskIsNoticedExceptUnderADialog) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::document_frame_test

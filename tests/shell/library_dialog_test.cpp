@@ -15,7 +15,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::library_dialog_test {
 namespace {
 
 using testing::HasSubstr;
@@ -60,4 +60,4 @@ TEST(LibraryDialog, OffersTheEntriesAndRefusesWhatIsNoLibrary) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::library_dialog_test

@@ -12,7 +12,7 @@
 #include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
 
-namespace tervane {
+namespace tervane::library_tab_test {
 namespace {
 
 using test::NextAnswer;
@@ -170,4 +170,4 @@ TEST_F(LibraryInWindow, IsOpenedOnceAndRefusedWithItsReason) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::library_tab_test

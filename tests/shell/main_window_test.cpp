@@ -18,7 +18,7 @@
 #include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
 
-namespace tervane {
+namespace tervane::main_window_test {
 namespace {
 
 using test::NextAnswer;
@@ -268,4 +268,4 @@ TEST(MainWindow, ZoomAndAppearanceKeepPageAndTypedTexts) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::main_window_test

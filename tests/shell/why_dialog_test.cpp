@@ -8,7 +8,7 @@
 
 #include <gtest/gtest.h>
 
-namespace tervane {
+namespace tervane::why_dialog_test {
 namespace {
 
 TEST(WhyDialogTest, ShowsReasonsAndLeadsToWhatDecides) {
@@ -40,4 +40,4 @@ TEST(WhyDialogTest, ShowsReasonsAndLeadsToWhatDecides) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::why_dialog_test

@@ -8,7 +8,7 @@
 #include "simspec/basic_parameters.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::extra_params_test {
 namespace {
 
 using test::TestSetup;
@@ -64,4 +64,4 @@ TEST(ExtraParams, TheSectionIsUsedAsTheBasicParametersSay) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::extra_params_test

@@ -14,7 +14,7 @@
 #include "tests/simspec/test_setup.h"
 #include "tests/support/split_at_arrow.h"
 
-namespace tervane {
+namespace tervane::model_components_test {
 namespace {
 
 using test::SplitAtArrow;
@@ -203,4 +203,4 @@ TEST(ModelComponents, WaterQualityOfATwoLayerUnsaturatedZoneIsAnError) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::model_components_test

@@ -11,7 +11,7 @@
 #include "tests/simspec/test_setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::periods_test {
 namespace {
 
 using test::TestSetup;
@@ -187,4 +187,4 @@ TEST(Periods, EveryDateThatIsWrongIsTold) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::periods_test

@@ -10,7 +10,7 @@
 #include "tests/simspec/test_setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::river_branches_test {
 namespace {
 
 using test::TempFolder;
@@ -63,4 +63,4 @@ TEST(RiverBranches, TellWhatIsOddAboutAReach) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::river_branches_test

@@ -6,7 +6,7 @@
 
 #include "spatial/data2d.h"
 
-namespace tervane {
+namespace tervane::cell_checks_test {
 namespace {
 
 using testing::ElementsAre;
@@ -71,4 +71,4 @@ TEST(CellChecks, CodesAndPlacesAreHeldAgainstWhatIsKnown) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::cell_checks_test

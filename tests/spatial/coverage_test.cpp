@@ -19,7 +19,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::coverage_test {
 namespace {
 
 using testing::ElementsAre;
@@ -242,4 +242,4 @@ TEST_F(Coverage, TakesWhatStayedTheSameFromTheBoardBefore) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::coverage_test

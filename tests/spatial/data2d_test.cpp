@@ -13,7 +13,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::data2d_test {
 namespace {
 
 using testing::HasSubstr;
@@ -141,4 +141,4 @@ TEST_F(Data2D, OldSetupsWereInterpolatedBilinearlyAndOnlySomeQuantitiesKnowTheGr
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::data2d_test

@@ -8,7 +8,7 @@
 
 #include "platform/item_types.h"
 
-namespace tervane {
+namespace tervane::domain_boundary_test {
 namespace {
 
 /// A grid from rows of digits, the northern one first; a point is an empty cell.
@@ -89,4 +89,4 @@ TEST(DomainBoundary, ConditionsAreBroughtIntoTheOrderOfTheBoundary) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::domain_boundary_test

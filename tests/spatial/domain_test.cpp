@@ -10,7 +10,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::domain_test {
 namespace {
 
 using testing::HasSubstr;
@@ -102,4 +102,4 @@ TEST(Domain, AChosenShapeFilePutsTheGridWhereItLies) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::domain_test

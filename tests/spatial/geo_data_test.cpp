@@ -7,7 +7,7 @@
 #include "simspec/model_components.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::geo_data_test {
 namespace {
 
 const Data2DKind kConductivity{.className = "CGeoDataWM2DKvf",
@@ -62,4 +62,4 @@ TEST(GeoData, WhatItsParentFindsWrongIsAnErrorOfItsOwnAndToldOnce) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::geo_data_test

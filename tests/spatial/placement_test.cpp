@@ -13,7 +13,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::placement_test {
 namespace {
 
 using testing::HasSubstr;
@@ -112,4 +112,4 @@ TEST(PlacementOfFiles, WithoutAPlaceIsAWarning) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::placement_test

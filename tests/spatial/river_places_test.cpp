@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::river_places_test {
 namespace {
 
 using testing::DoubleEq;
@@ -56,4 +56,4 @@ TEST(RiverPlaces, ACourseGoesAsFarAsItsBranch) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::river_places_test

@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::river_reaches_test {
 namespace {
 
 using testing::ElementsAre;
@@ -64,4 +64,4 @@ TEST(RiverReaches, OfATurnedGridFollowItsCells) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::river_reaches_test

@@ -6,7 +6,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::series_totals_test {
 namespace {
 
 using testing::ElementsAre;
@@ -120,4 +120,4 @@ TEST(SeriesTotals, AreAmountsOfRatesAndMeansOfStates) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::series_totals_test

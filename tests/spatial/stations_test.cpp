@@ -15,7 +15,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::stations_test {
 namespace {
 
 using testing::ElementsAre;
@@ -260,4 +260,4 @@ TEST_F(Stations, OnlyTheFileOfTheStateInForceIsChecked) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::stations_test

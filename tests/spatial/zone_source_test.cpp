@@ -12,7 +12,7 @@
 #include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::zone_source_test {
 namespace {
 
 using testing::ElementsAre;
@@ -216,4 +216,4 @@ TEST_F(ZoneSources, AnOwnerOfStationsNeedsToKnowOnlyWhatItsStationsHold) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::zone_source_test

@@ -9,7 +9,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::zones_test {
 namespace {
 
 using testing::ElementsAre;
@@ -84,4 +84,4 @@ TEST_F(Zones, AreWrittenWithTheirNumbersAndReadInTheirOrder) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::zones_test

@@ -13,7 +13,7 @@
 #include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::boundary_test {
 namespace {
 
 using Segment = CGeoDataBoundCondItemKvf;
@@ -200,4 +200,4 @@ TEST(OuterBoundary, CoordinatesThatStandForNoneAreReadByTheVersionOfTheFile) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::boundary_test

@@ -10,7 +10,7 @@
 #include "subsurface/saturated_zone.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::computational_layers_test {
 namespace {
 
 std::string Children(const CYbSEKvfBase& node) {
@@ -109,4 +109,4 @@ TEST(ComputationalLayers, AnotherCountThanThatOfTheGeologyIsAWarningWhileTheyFol
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::computational_layers_test

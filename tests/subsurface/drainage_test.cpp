@@ -10,7 +10,7 @@
 #include "subsurface/saturated_zone.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::drainage_test {
 namespace {
 
 using test::TestSetup;
@@ -120,4 +120,4 @@ TEST(Drainage, TheDrainThatWasMadeLastAnswersWhateverHappensToTheOthers) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::drainage_test

@@ -13,7 +13,7 @@
 #include "subsurface/saturated_zone.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::geology_test {
 namespace {
 
 using test::TestSetup;
@@ -230,4 +230,4 @@ TEST(Geology, PropertiesAreCopiedWithTheirFilesButNotTheLowerLevel) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::geology_test

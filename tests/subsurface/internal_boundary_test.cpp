@@ -8,7 +8,7 @@
 #include "simspec/basic_parameters.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::internal_boundary_test {
 namespace {
 
 using Zone = CSZVerDiscrInternalBoundaryPropKvf;
@@ -106,4 +106,4 @@ TEST(InternalBoundary, KeysAreWrittenInTheirOrderAndTheSourceIsNotShifted) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::internal_boundary_test

@@ -9,7 +9,7 @@
 #include "subsurface/wells.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::reservoirs_test {
 namespace {
 
 using test::TestSetup;
@@ -66,4 +66,4 @@ TEST(Reservoirs, ZonesAreReadAndWrittenWithTheirTwoReservoirsAndLinks) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::reservoirs_test

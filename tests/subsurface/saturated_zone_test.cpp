@@ -10,7 +10,7 @@
 #include "subsurface/wells.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::saturated_zone_test {
 namespace {
 
 TEST(SaturatedZone, TakesPartByTheComponentsOfTheEngine) {
@@ -72,4 +72,4 @@ TEST(SaturatedZone, IsTheSubsurfaceWithAModflowEngine) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::saturated_zone_test

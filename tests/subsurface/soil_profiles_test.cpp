@@ -8,7 +8,7 @@
 #include "tests/simspec/test_setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::soil_profiles_test {
 namespace {
 
 using test::TestSetup;
@@ -130,4 +130,4 @@ TEST_F(Profile, DispersivityIsNotNegative) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::soil_profiles_test

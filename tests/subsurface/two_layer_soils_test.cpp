@@ -6,7 +6,7 @@
 
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::two_layer_soils_test {
 namespace {
 
 TEST(TwoLayerSoils, AreWrittenWithTheirValuesAndReadAgain) {
@@ -38,4 +38,4 @@ TEST(TwoLayerSoils, ValuesThatContradictAreTold) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::two_layer_soils_test

@@ -7,7 +7,7 @@
 #include "subsurface/unsaturated_zone.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::unsaturated_initial_conditions_test {
 namespace {
 
 using test::TestSetup;
@@ -67,4 +67,4 @@ TEST(UnsaturatedInitialConditions, AGridOfThreeDimensionsIsAskedForWhileItIsInUs
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::unsaturated_initial_conditions_test

@@ -8,7 +8,7 @@
 #include "simspec/model_components.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::unsaturated_zone_test {
 namespace {
 
 using test::TestSetup;
@@ -77,4 +77,4 @@ TEST_F(UnsaturatedZone, ClassifiesForDepthsOfTheGroundwater) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::unsaturated_zone_test

@@ -11,7 +11,7 @@
 #include "tests/simspec/test_setup.h"
 #include "tests/support/split_at_arrow.h"
 
-namespace tervane {
+namespace tervane::climate_test {
 namespace {
 
 using test::SplitAtArrow;
@@ -224,4 +224,4 @@ TEST(Climate, OldSetupsHoldEvapotranspirationElsewhereAndTheirSnowInTwoNumbers) 
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::climate_test

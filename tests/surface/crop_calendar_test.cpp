@@ -10,7 +10,7 @@
 
 #include "surface/vegetation_file.h"
 
-namespace tervane {
+namespace tervane::crop_calendar_test {
 namespace {
 
 const CYbDateTime kBegin{2001, 1, 1};
@@ -96,4 +96,4 @@ TEST(CropCalendar, EndsWhereItIsTooLongAndWithoutAnEnd) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::crop_calendar_test

@@ -10,7 +10,7 @@
 
 #include "surface/vegetation_file.h"
 
-namespace tervane {
+namespace tervane::crop_course_test {
 namespace {
 
 constexpr std::int64_t kDay = 86'400;
@@ -108,4 +108,4 @@ TEST_F(CropDevelopments, AreLinearBetweenStagesAndCutAtThePeriodAndAtTheNextCrop
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::crop_course_test

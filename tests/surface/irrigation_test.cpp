@@ -14,7 +14,7 @@
 #include "tests/simspec/test_setup.h"
 #include "tests/support/split_at_arrow.h"
 
-namespace tervane {
+namespace tervane::irrigation_test {
 namespace {
 
 using test::SplitAtArrow;
@@ -254,4 +254,4 @@ TEST(Irrigation, PrioritiesKeepPolygonsThatAFileHoldsAndMakeNoZones) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::irrigation_test

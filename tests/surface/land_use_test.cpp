@@ -9,7 +9,7 @@
 #include "simspec/basic_parameters.h"
 #include "tests/simspec/test_setup.h"
 
-namespace tervane {
+namespace tervane::land_use_test {
 namespace {
 
 using test::TestSetup;
@@ -54,4 +54,4 @@ TEST(LandUse, PrioritiesAreCountedFromOneInTheFile) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::land_use_test

@@ -13,7 +13,7 @@
 #include "tests/simspec/test_setup.h"
 #include "tests/support/split_at_arrow.h"
 
-namespace tervane {
+namespace tervane::overland_test {
 namespace {
 
 using test::SplitAtArrow;
@@ -180,4 +180,4 @@ TEST(Overland, ZonesKeepTheirValuesByTheirOrder) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::overland_test

@@ -13,7 +13,7 @@
 #include "tests/simspec/test_setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::rivers_test {
 namespace {
 
 using test::ReadFile;
@@ -167,4 +167,4 @@ TEST_F(Rivers, ANewNetworkHasTheAreaOfTheDomain) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::rivers_test

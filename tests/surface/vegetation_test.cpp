@@ -15,7 +15,7 @@
 #include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::vegetation_test {
 namespace {
 
 using test::TestSetup;
@@ -277,4 +277,4 @@ TEST_F(VegetationFiles, AStationWhoseCropsAUserChoseIsNamedBeforeItGoes) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::vegetation_test

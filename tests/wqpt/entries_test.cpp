@@ -13,7 +13,7 @@
 #include "wqpt/species_entries.h"
 #include "wqpt/water_quality_layers.h"
 
-namespace tervane {
+namespace tervane::entries_test {
 namespace {
 
 using test::QualitySetup;
@@ -291,4 +291,4 @@ TEST(Entries, ValuesBelowTheirRangeAreRefused) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::entries_test

@@ -6,7 +6,7 @@
 
 #include "tests/wqpt/quality_setup.h"
 
-namespace tervane {
+namespace tervane::extractions_test {
 namespace {
 
 using test::QualitySetup;
@@ -59,4 +59,4 @@ TEST(Extractions, NamesAreCountedFromEachNewListOn) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::extractions_test

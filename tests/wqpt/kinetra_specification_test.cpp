@@ -14,7 +14,7 @@
 #include "wqpt/kinetra_values.h"
 #include "wqpt/species.h"
 
-namespace tervane {
+namespace tervane::kinetra_specification_test {
 namespace {
 
 using test::QualitySetup;
@@ -244,4 +244,4 @@ TEST_F(Kinetra, ParametersExistByCompartment) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::kinetra_specification_test

@@ -7,7 +7,7 @@
 #include "simspec/model_components.h"
 #include "tests/wqpt/quality_setup.h"
 
-namespace tervane {
+namespace tervane::processes_test {
 namespace {
 
 using test::QualitySetup;
@@ -109,4 +109,4 @@ TEST(Processes, WhatIsRefusedFirst) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::processes_test

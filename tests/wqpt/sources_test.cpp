@@ -8,7 +8,7 @@
 #include "tests/wqpt/quality_setup.h"
 #include "wqpt/species.h"
 
-namespace tervane {
+namespace tervane::sources_test {
 namespace {
 
 using test::QualitySetup;
@@ -77,4 +77,4 @@ TEST(Sources, TheExtentNamesOneOfTwoFiles) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::sources_test

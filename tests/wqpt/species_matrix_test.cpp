@@ -6,7 +6,7 @@
 
 #include "tests/wqpt/quality_setup.h"
 
-namespace tervane {
+namespace tervane::species_matrix_test {
 namespace {
 
 using test::QualitySetup;
@@ -53,4 +53,4 @@ TEST(SpeciesMatrix, TellsWhatTakesPartWhereAndWhatStandsAtItsDefault) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::species_matrix_test

@@ -8,7 +8,7 @@
 #include "tests/wqpt/quality_setup.h"
 #include "wqpt/processes.h"
 
-namespace tervane {
+namespace tervane::species_test {
 namespace {
 
 using test::QualitySetup;
@@ -89,4 +89,4 @@ TEST(Species, ASetupOfVersionTenWithMassOnTheGroundIsToBeLookedAt) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::species_test

@@ -11,7 +11,7 @@
 #include "spatial/data2d.h"
 #include "tests/support/page_driver.h"
 
-namespace tervane {
+namespace tervane::coverage_page_test {
 namespace {
 
 using testing::HasSubstr;
@@ -110,4 +110,4 @@ TEST_F(CoveragePage, FollowsTheSetup) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::coverage_page_test

@@ -9,7 +9,7 @@
 
 #include <gmock/gmock.h>
 
-namespace tervane {
+namespace tervane::help_pages_test {
 namespace {
 
 struct Heading {
@@ -165,4 +165,4 @@ TEST(HelpPages, SayEnoughToHelp) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::help_pages_test

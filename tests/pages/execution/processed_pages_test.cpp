@@ -18,7 +18,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::processed_pages_test {
 namespace {
 
 namespace fs = std::filesystem;
@@ -236,4 +236,4 @@ TEST(ProcessedPages, EditHandsTheFileToItsViewerWithTheBackdropOfItsItem) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::processed_pages_test

@@ -14,7 +14,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::create_dialogs_test {
 namespace {
 
 using testing::HasSubstr;
@@ -97,4 +97,4 @@ TEST_F(CreateDialogs, ADomainIsFittedToAShapeFileThatIsTypedOrMade) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::create_dialogs_test

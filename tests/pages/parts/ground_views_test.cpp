@@ -20,7 +20,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::ground_views_test {
 namespace {
 
 using testing::ElementsAre;
@@ -226,4 +226,4 @@ TEST_F(GroundViewsTest, ASectionShowsLayersLensesAndWhereLevelsCross) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::ground_views_test

@@ -13,7 +13,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::plot_content_test {
 namespace {
 
 /// Around the line that shows where the model lies on the map of a page; nothing without it.
@@ -58,4 +58,4 @@ TEST(PlotContent, EachMapButThatOfTheDomainShowsWhereTheModelLies) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::plot_content_test

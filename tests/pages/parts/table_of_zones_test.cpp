@@ -15,7 +15,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::table_of_zones_test {
 namespace {
 
 using testing::ElementsAre;
@@ -169,4 +169,4 @@ TEST_F(TableOfZonesPage, StationsHaveTheirSeriesWithItsMean) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::table_of_zones_test

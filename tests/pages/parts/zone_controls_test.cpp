@@ -10,7 +10,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::zone_controls_test {
 namespace {
 
 using testing::ElementsAre;
@@ -142,4 +142,4 @@ TEST_F(ZoneControls, AChosenFileBringsTheZonesInStepWhereThereAreAny) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::zone_controls_test

@@ -7,7 +7,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::components_pages_test {
 namespace {
 
 using test::PageDriver;
@@ -81,4 +81,4 @@ TEST(ComponentsPages, WithoutWaterMovementTheComponentsAreDisabledAndKeepTheirVa
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::components_pages_test

@@ -7,7 +7,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
 
-namespace tervane {
+namespace tervane::control_pages_test {
 namespace {
 
 using test::PageDriver;
@@ -70,4 +70,4 @@ TEST(ControlPages, OnlyRichardsEquationHasIterations) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::control_pages_test

@@ -10,7 +10,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::period_pages_test {
 namespace {
 
 using test::PageDriver;
@@ -104,4 +104,4 @@ TEST(PeriodPages, RecyclingDecidesWhichDatesCount) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::period_pages_test

@@ -10,7 +10,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::data2d_pages_test {
 namespace {
 
 TEST(Data2DPages, TheUnitOfTheValueFollowsWhetherItIsRelativeToTheGround) {
@@ -41,4 +41,4 @@ TEST(Data2DPages, AFileThatIsNotValidIsNotDrawnAndTheReasonStandsInItsPlace) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::data2d_pages_test

@@ -14,7 +14,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::station_pages_test {
 namespace {
 
 using testing::ElementsAre;
@@ -126,4 +126,4 @@ TEST(StationPage, SeriesOfOtherStationsAndFilesAreLaidOverTheChart) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::station_pages_test

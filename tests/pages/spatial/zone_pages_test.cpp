@@ -13,7 +13,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::zone_pages_test {
 namespace {
 
 using testing::ElementsAre;
@@ -119,4 +119,4 @@ TEST_F(ZonePage, LinksAreTakenFromTheBranchesThatCrossTheZone) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::zone_pages_test

@@ -10,7 +10,7 @@
 #include "subsurface/saturated_zone.h"
 #include "tests/support/page_driver.h"
 
-namespace tervane {
+namespace tervane::geology_pages_test {
 namespace {
 
 class GeologyPages : public testing::Test {
@@ -78,4 +78,4 @@ TEST_F(GeologyPages, UnitsHaveColumnsForWhatTransportNeeds) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::geology_pages_test

@@ -17,7 +17,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::outer_boundary_pages_test {
 namespace {
 
 constexpr const char* kList = "SaturatedZone/CompLayersGeoSZ/Layer_1/OuterBoundary";
@@ -159,4 +159,4 @@ TEST_F(OuterBoundaryPages, ADomainWithoutAClosedBoundaryTellsSoInThePlaceOfTheMa
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::outer_boundary_pages_test

@@ -11,7 +11,7 @@
 #include "subsurface/unsaturated_zone.h"
 #include "tests/support/page_driver.h"
 
-namespace tervane {
+namespace tervane::soil_pages_test {
 namespace {
 
 using testing::ElementsAre;
@@ -103,4 +103,4 @@ TEST_F(SoilPages, MethodsDecideWhatCanBeChanged) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::soil_pages_test

@@ -12,7 +12,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::well_pages_test {
 namespace {
 
 using testing::ElementsAre;
@@ -99,4 +99,4 @@ TEST_F(WellPage, TheMapHasTheWellsWithTheirNames) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::well_pages_test

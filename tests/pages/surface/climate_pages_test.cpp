@@ -9,7 +9,7 @@
 #include "surface/climate.h"
 #include "tests/support/page_driver.h"
 
-namespace tervane {
+namespace tervane::climate_pages_test {
 namespace {
 
 class ClimatePages : public testing::Test {
@@ -104,4 +104,4 @@ TEST_F(ClimatePages, ElevationsAreAskedForWhereTheyAreUsed) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::climate_pages_test

@@ -12,7 +12,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::crop_controls_test {
 namespace {
 
 using testing::HasSubstr;
@@ -155,4 +155,4 @@ TEST_F(CropPage, AStartIsPickedOrDraggedOnTheChart) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::crop_controls_test

@@ -15,7 +15,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::irrigation_pages_test {
 namespace {
 
 using testing::HasSubstr;
@@ -229,4 +229,4 @@ TEST_F(IrrigationPages, ADemandShowsWhatItsKindAsksFor) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::irrigation_pages_test

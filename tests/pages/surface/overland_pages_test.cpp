@@ -12,7 +12,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::overland_pages_test {
 namespace {
 
 TEST(OverlandPages, AnExchangeIsReducedOnlyWhereThereIsOne) {
@@ -79,4 +79,4 @@ TEST(OverlandPages, AShapeFileOfPondedAreasIsAskedForInWordsOfItsOwn) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::overland_pages_test

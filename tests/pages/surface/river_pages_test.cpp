@@ -14,7 +14,7 @@
 #include "tests/support/page_driver.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::river_pages_test {
 namespace {
 
 using testing::ElementsAre;
@@ -96,4 +96,4 @@ TEST_F(RiverPage, ANewNetworkIsWrittenAndChosen) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::river_pages_test

@@ -15,7 +15,7 @@
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::vegetation_pages_test {
 namespace {
 
 class VegetationPages : public testing::Test {
@@ -138,4 +138,4 @@ TEST_F(VegetationPages, CreateBeginsWithTheConstantTheQuantityAndATitleOfItsOwn)
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::vegetation_pages_test

@@ -10,7 +10,7 @@
 
 #include "shell/charts/series_plot.h"
 
-namespace tervane {
+namespace tervane::chart_markers_test {
 namespace {
 
 CYbDateTime Day(int day) { return CYbDateTime(2000, 1, 1) + CYbDateTimeSpan::Days(day); }
@@ -90,4 +90,4 @@ TEST(ChartMarkers, ADateIsAskedForUntilAClickOrEsc) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::chart_markers_test

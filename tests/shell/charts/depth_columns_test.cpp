@@ -6,7 +6,7 @@
 
 #include "shell/widgets/qt_text.h"
 
-namespace tervane {
+namespace tervane::depth_columns_test {
 namespace {
 
 class Depths : public testing::Test {
@@ -47,4 +47,4 @@ TEST_F(Depths, WhatCannotBeDrawnDoesNoHarm) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::depth_columns_test

@@ -9,7 +9,7 @@
 
 #include "tests/shell/plot_events.h"
 
-namespace tervane {
+namespace tervane::section_view_test {
 namespace {
 
 constexpr float kEmpty = -99;
@@ -90,4 +90,4 @@ TEST(SectionView, WithoutALineTheMessageIsShown) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::section_view_test

@@ -17,7 +17,7 @@
 #include "shell/charts/series_chooser.h"
 #include "tests/shell/plot_events.h"
 
-namespace tervane {
+namespace tervane::series_plot_test {
 namespace {
 
 using test::Hover;
@@ -361,4 +361,4 @@ TEST(SeriesPlot, NothingToShowShowsItsMessageUntilThereIsSomething) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::series_plot_test

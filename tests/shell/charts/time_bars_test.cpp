@@ -10,7 +10,7 @@
 #include "shell/charts/series_plot.h"
 #include "tests/shell/plot_events.h"
 
-namespace tervane {
+namespace tervane::time_bars_test {
 namespace {
 
 CYbDateTime Day(int day) { return CYbDateTime(2001, 1, 1) + CYbDateTimeSpan::Days(day); }
@@ -83,4 +83,4 @@ TEST_F(TimeBars, ComeAndGoWithTheContent) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::time_bars_test

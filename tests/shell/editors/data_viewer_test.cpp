@@ -16,7 +16,7 @@
 #include "tests/shell/opened_setup.h"
 #include "tests/support/data_files.h"
 
-namespace tervane {
+namespace tervane::data_viewer_test {
 namespace {
 
 using test::OpenedSetup;
@@ -79,4 +79,4 @@ TEST(DataViewer, EditShowsTheFileInATabThatFollowsItAndClosesByItself) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::data_viewer_test

@@ -11,7 +11,7 @@
 
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::text_file_view_test {
 namespace {
 
 using testing::HasSubstr;
@@ -55,4 +55,4 @@ TEST(TextFileView, FollowsTheFileAndSaysWhyThereIsNone) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::text_file_view_test

@@ -7,7 +7,7 @@
 #include "forms/map_question.h"
 #include "tests/shell/maps/shown_map.h"
 
-namespace tervane {
+namespace tervane::map_gestures_test {
 namespace {
 
 using test::ShownMap;
@@ -121,4 +121,4 @@ TEST_F(MapGestures, ALineGrowsByClicksAndEndsWithADoubleClick) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::map_gestures_test

@@ -8,7 +8,7 @@
 
 #include "tests/shell/maps/shown_map.h"
 
-namespace tervane {
+namespace tervane::map_labels_test {
 namespace {
 
 using test::ShownMap;
@@ -99,4 +99,4 @@ TEST(MapLabels, PolygonsOfOneValueHaveOneColourAndBearItWhereItFits) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::map_labels_test

@@ -9,7 +9,7 @@
 
 #include "tests/shell/maps/shown_map.h"
 
-namespace tervane {
+namespace tervane::map_lines_test {
 namespace {
 
 using test::ShownMap;
@@ -106,4 +106,4 @@ TEST(MapLines, PiecesOfABoundaryHaveTheColoursOfTheirValues) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::map_lines_test

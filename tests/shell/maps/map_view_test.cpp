@@ -14,7 +14,7 @@
 #include "tests/shell/maps/shown_map.h"
 #include "tests/shell/plot_events.h"
 
-namespace tervane {
+namespace tervane::map_view_test {
 namespace {
 
 using test::Wheel;
@@ -248,4 +248,4 @@ TEST(MapView, NothingToShowShowsItsMessage) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::map_view_test

@@ -19,7 +19,7 @@
 #include "tests/shell/opened_setup.h"
 #include "tests/support/preprocessed_run.h"
 
-namespace tervane {
+namespace tervane::page_view_test {
 namespace {
 
 using test::OpenedSetup;
@@ -232,4 +232,4 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::page_view_test

@@ -12,7 +12,7 @@
 #include "shell/widgets/qt_text.h"
 #include "tests/support/temp_folder.h"
 
-namespace tervane {
+namespace tervane::report_widget_test {
 namespace {
 
 using testing::HasSubstr;
@@ -95,4 +95,4 @@ TEST_F(ReportWidgetTest, AMissingFileIsToldUntilItIsThere) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::report_widget_test

@@ -16,7 +16,7 @@
 #include "tests/shell/opened_setup.h"
 #include "tests/support/table_page.h"
 
-namespace tervane {
+namespace tervane::table_view_test {
 namespace {
 
 /// Rows of extra parameters with the names that are given, one letter each.
@@ -440,4 +440,4 @@ TEST(TableView, RowsOfAllStationsAreFilteredSortedAndOpened) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::table_view_test

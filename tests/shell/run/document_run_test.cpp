@@ -25,7 +25,7 @@
 #include "tests/shell/opened_setup.h"
 #include "tests/support/engine_script.h"
 
-namespace tervane {
+namespace tervane::document_run_test {
 namespace {
 
 using test::NextAnswer;
@@ -308,4 +308,4 @@ TEST(DocumentRun, LeadsFromAChangedFileToTheProcessedPages) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::document_run_test

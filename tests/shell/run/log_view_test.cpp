@@ -9,7 +9,7 @@
 
 #include <gtest/gtest.h>
 
-namespace tervane {
+namespace tervane::log_view_test {
 namespace {
 
 class LogViewTest : public testing::Test {
@@ -76,4 +76,4 @@ TEST_F(LogViewTest, CopiesWhatIsChosenOrAll) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::log_view_test

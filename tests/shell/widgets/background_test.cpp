@@ -22,7 +22,7 @@
 #include "spatial/data2d.h"
 #include "tests/shell/opened_setup.h"
 
-namespace tervane {
+namespace tervane::background_test {
 namespace {
 
 using test::OpenedSetup;
@@ -162,4 +162,4 @@ TEST(Background, APageShowsTheGridThatIsComputedInTheForeground) {
 }
 
 }  // namespace
-}  // namespace tervane
+}  // namespace tervane::background_test
