@@ -7,20 +7,20 @@
 #include <string_view>
 #include <vector>
 
+#include "modelcells/work_log.h"
+
 namespace tervane {
 
 /// What an engine prints, a line at a time, each passed on at once. Whoever started it makes findings of its errors and
 /// warnings, and moves a bar by its progress.
-class EngineOutput {
+class EngineOutput : public WorkLog {
  public:
   explicit EngineOutput(std::ostream& out) : out_(out) {}
 
   void Line(std::string_view text);
-  /// `percent` of the whole run.
-  void Progress(int percent, std::string_view doing);
-  /// `place` is the path of a node, with ":Key" behind it where one key is meant; empty for the setup as a whole.
-  void Error(std::string_view place, std::string_view text);
-  void Warning(std::string_view place, std::string_view text);
+  void Progress(int percent, std::string_view doing) override;
+  void Error(std::string_view place, std::string_view text) override;
+  void Warning(std::string_view place, std::string_view text) override;
 
   int Errors() const { return errors_; }
   /// All warnings, as they were printed.

@@ -8,10 +8,10 @@
 
 #include "document/flow_model_document.h"
 #include "engine/engine_output.h"
-#include "engine/model_grids.h"
-#include "engine/model_layers.h"
 #include "engine/report.h"
 #include "geometry/grid.h"
+#include "modelcells/model_grids.h"
+#include "modelcells/model_layers.h"
 
 namespace tervane {
 

@@ -10,7 +10,7 @@
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "execution/execute_flags.h"
-#include "engine/model_layers.h"
+#include "modelcells/model_layers.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
 #include "simspec/model_components.h"

@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "engine/model_grids.h"
+#include "modelcells/model_grids.h"
 
 #include <cmath>
 
@@ -52,7 +52,7 @@ int ModelGridFile::Add(ModelGrid grid) {
   return static_cast<int>(grids_.size());
 }
 
-bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, EngineOutput& log) {
+bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, WorkLog& log) {
   NewDataFile content;
   content.geometry = FileGeometryOf(domain.Geometry());
   content.hasTime = false;

@@ -10,8 +10,8 @@
 #include <vector>
 
 #include "data/datafile.h"
-#include "engine/engine_output.h"
 #include "geometry/grid.h"
+#include "modelcells/work_log.h"
 #include "platform/item_types.h"
 
 namespace tervane {
@@ -51,7 +51,7 @@ class ModelGridFile {
   int Add(ModelGrid grid);
   /// Makes one quantity after the other, puts it on the cells of the domain, and writes it. Outside the domain all is
   /// empty. False when one could not be made, which the log tells; then an old file stands.
-  bool Write(const CTvn2DOrthoRotatedGridData& domain, EngineOutput& log);
+  bool Write(const CTvn2DOrthoRotatedGridData& domain, WorkLog& log);
 
  private:
   std::string path_;

@@ -10,8 +10,8 @@
 #include <utility>
 #include <vector>
 
-#include "engine/engine_output.h"
 #include "geometry/grid.h"
+#include "modelcells/work_log.h"
 #include "platform/files.h"
 
 namespace tervane {
@@ -25,7 +25,7 @@ class ModelLayers {
   /// Puts ground and levels on the cells of the domain. A layer that is thinner than the setup allows, or whose level
   /// lies above the one over it, ends lower; a warning tells in how many cells. False, with an error in the log, where
   /// a level cannot be had. A uniform discretization has no layers.
-  bool Make(const CSatZoneKvf& zone, const CTvn2DOrthoRotatedGridData& domain, EngineOutput& log);
+  bool Make(const CSatZoneKvf& zone, const CTvn2DOrthoRotatedGridData& domain, WorkLog& log);
   /// Writes the levels as items of one file, whose layer 0 is the bottom: `kLowerLevels` and `kUpperLevels`.
   FileResult Write(const std::string& path, const CTvn2DOrthoRotatedGridData& domain) const;
   static constexpr int kLowerLevels = 1, kUpperLevels = 2;
@@ -56,6 +56,6 @@ FileResult BoundaryCodes(const CSZVerDiscrLayerKvf& layer, const CTvn2DOrthoRota
 /// Where the wells of a file stand: a line for each filter, with the cell and the layers that it meets. Wells outside
 /// the model, and filters outside all layers, are warnings of `place`.
 std::string WellsOnModel(const std::string& path, const CTvn2DOrthoRotatedGridData& domain, const ModelLayers& layers,
-                         const std::string& place, EngineOutput& log);
+                         const std::string& place, WorkLog& log);
 
 }  // namespace tervane

@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "engine/model_layers.h"
+#include "modelcells/model_layers.h"
 
 #include <cmath>
 #include <map>
@@ -10,8 +10,8 @@
 
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
-#include "engine/model_grids.h"
 #include "libraries/wells.h"
+#include "modelcells/model_grids.h"
 #include "platform/item_types.h"
 #include "spatial/domain_cells.h"
 #include "subsurface/computational_layers.h"
@@ -45,7 +45,7 @@ void EmptyOutside(const CTvn2DOrthoRotatedGridData& domain, std::vector<float>& 
 
 }  // namespace
 
-bool ModelLayers::Make(const CSatZoneKvf& zone, const CTvn2DOrthoRotatedGridData& domain, EngineOutput& log) {
+bool ModelLayers::Make(const CSatZoneKvf& zone, const CTvn2DOrthoRotatedGridData& domain, WorkLog& log) {
   *this = {};
   const std::vector<GroundBody> layers = ComputationalLayersOf(zone), geology = GeologicalLayersOf(zone);
   const auto* topography = zone.Important(kTopography);
@@ -182,7 +182,7 @@ FileResult BoundaryCodes(const CSZVerDiscrLayerKvf& layer, const CTvn2DOrthoRota
 // ---- Wells
 
 std::string WellsOnModel(const std::string& path, const CTvn2DOrthoRotatedGridData& domain, const ModelLayers& layers,
-                         const std::string& place, EngineOutput& log) {
+                         const std::string& place, WorkLog& log) {
   CTvnWellDataList list;
   if (!list.LoadWellDataFile(path)) {
     log.Warning(place, list.Problem());
