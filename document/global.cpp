@@ -18,6 +18,7 @@
 #include "simspec/extra_params.h"
 #include "simspec/introduction.h"
 #include "simspec/model_components.h"
+#include "simspec/modflow_output.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/zones.h"
@@ -91,6 +92,7 @@ constexpr std::array kChildren{
     Child<CSatZoneSubCatchmentKvf>(kReservoirZone),
     ChildRow{MakeBy<NewGroundwaterTable>, {}},
     Child<CSourcesWQListKvf>(kSources),
+    Child<COutputModKvf>(),
     Child<CExtraParamsKvf>(),
     Child<CExecuteEngineFlagsKvf>(kExecuteFlags),
     Child<CProcDataKvf>(kProcessedData),

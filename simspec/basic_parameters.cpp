@@ -5,8 +5,10 @@
 #include "simspec/air_flow.h"
 #include "simspec/control_parameters.h"
 #include "simspec/model_components.h"
+#include "simspec/modflow_solvers.h"
 #include "simspec/pages.h"
 #include "simspec/periods.h"
+#include "simspec/stress_periods.h"
 #include "simspec/time_step_control.h"
 #include "simspec/titles.h"
 
@@ -20,11 +22,14 @@ CBasicParaKvf::CBasicParaKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Simulation spe
   NewImportantChild<CModModelCompKvf>(kModflowComponents);
   NewChild<CSimTitleKvf>();
   NewImportantChild<CSimPeriodKvf>(kSimulationPeriod);
+  NewImportantChild<CStressPeriodsKvf>(kStressPeriods);
   NewChild<CCompControlParaTimeStepKvf>();
   NewImportantChild<CCompControlParaOLKvf>(kOverlandControl);
   NewChild<CCompControlParaUZKvf>();
   NewChild<CCompControlParaSZKvf>();
+  NewChild<CCompControlParaModPackageKvf>();
   NewChild<CAirFlowModKvf>();
+  NewChild<CCompControlParaModKvf>();
 }
 
 void CBasicParaKvf::ReadData(KvfNode* section) {

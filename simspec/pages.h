@@ -28,5 +28,10 @@ inline constexpr PageClass kControlPTPage{"CCompControlParaPTDlg", 0};
 inline constexpr PageClass kControlOLPage{"CCompControlParaOLDlg", 16466};
 inline constexpr PageClass kControlUZPage{"CCompControlParaUZDlg", 16473};
 inline constexpr PageClass kControlSZPage{"CCompControlParaSZDlg", 16468};
+inline constexpr PageClass kControlModflowPage{"CCompControlParaModDlg", 16459};
+inline constexpr PageClass kModflowPackagePage{"CCompControlParaModPackageDlg", 16461};
+inline constexpr PageClass kStressPeriodsPage{"CStressPeriodsDlg", 16617};
+inline constexpr PageClass kStressPeriodPropertiesPage{"CStressPeriodsPropDlg", 0};
+inline constexpr PageClass kModflowOutputPage{"COutputModDlg", 16524};
 
 }  // namespace tervane

@@ -6,6 +6,7 @@
 
 #include <string>
 
+#include "simspec/modflow_output.h"
 #include "spatial/cell_checks.h"
 #include "spatial/geo_data.h"
 #include "wqpt/ground.h"
@@ -21,6 +22,7 @@ class CSZVerDiscrLayerListKvf;
 class CSatZoneKvf : public CYbSEKvfBase,
                     public GroundParameterDistribution,
                     public ImmobileWaterChoice,
+                    public WellChoice,
                     public CellChecker {
  public:
   explicit CSatZoneKvf(CYbSEKvfBase* parent);
@@ -60,6 +62,7 @@ class CSatZoneKvf : public CYbSEKvfBase,
   bool AddWellOverlaySection(KvfFile* file, std::string& error) const;
   const int& TypeOfGeoParaDistribution() const override { return ParameterDistribution; }
   const int& GetMassTransferToImmobileWater() const override { return MassTransferToImmobileWater; }
+  const int& GetWells() const override { return Wells; }
 
   /// Two findings of the whole: a domain whose boundary cannot be traced where segments lie on it, and computational
   /// layers that are not as many as the geological layers that they follow.

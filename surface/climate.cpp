@@ -8,6 +8,7 @@
 #include "simspec/conditions.h"
 #include "simspec/water_quality_conditions.h"
 #include "surface/pages.h"
+#include "surface/stress_period_grids.h"
 
 namespace tervane {
 
@@ -97,6 +98,11 @@ const Data2DKind kWetLapseRate{.className = "CWetLapseRateKvf",
                                .itemType = quantity::kTemperatureLapseRate,
                                .fixedValue = -0.3F,
                                .shortTitle = "Wet Lapse Rate"};
+
+const Data2DKind kRechargeFraction{.className = "CRechargeFractionModKvf",
+                                   .section = "RechargeFraction",
+                                   .title = "Recharge Fraction",
+                                   .itemType = quantity::kFraction};
 
 const Data2DKind kThresholdTemperature{.className = "CThreshMeltTempKvf",
                                        .section = "ThreshMeltTemp",
@@ -192,6 +198,12 @@ CPrecipitationRelatedKvf::CPrecipitationRelatedKvf(CYbSEKvfBase* parent) : CTvnK
   NewImportantChild<CSnowmeltConstKvf>(kSnowMelt);
   NewNetRainfallFraction(*this);
   NewInfiltrationFraction(*this);
+  NewChild<CData2DKvf>(kRechargeFraction, AnyModflow());
+  NewChild<CRechargeAndPondingModListKvf>(kRechargeLayer,
+                                          AnyModflow() && IsInParent(&Climate::RechargeOption, {kGivenLayer}));
+  NewChild<CRechargeAndPondingModListKvf>(
+      kPondingElevation,
+      WithEngine({kEngineModflowSurfact}) && IsInParent(&Climate::PondingOption, {kUpToPondingElevation}));
 }
 
 int CPrecipitationRelatedKvf::ValidateData() {
@@ -210,9 +222,29 @@ void CPrecipitationRelatedKvf::ExchangeKeys(KeyExchange& keys) {
   keys("PondingOption", PondingOption).OneOf(kPondingOptions);
 }
 
+// ---- Evapotranspiration as old files have it
+
+CEvapotransKvf::CEvapotransKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Evapotranspiration", "Evapotrans", parent) {
+  NewChild<CRechargeAndPondingModListKvf>(kETSurfaceElevation, AnyModflow());
+  NewChild<CRechargeAndPondingModListKvf>(kETExtinctionDepth, AnyModflow());
+  NewChild<CRechargeAndPondingModListKvf>(kETLayer, AnyModflow() && OnInParent(&CEvapotransKvf::ETLayer));
+}
+
 void CEvapotransKvf::ReadData(KvfNode* section) {
   CTvnKvfBase::ReadData(section);
+  NoteWhatIsLost(section);
   if (auto* evapotranspiration = Important(kReferenceEvapotranspiration)) evapotranspiration->Load(section);
+}
+
+void CEvapotransKvf::NoteWhatIsLost(KvfNode* section) const {
+  if (!UsesModflow(*this)) return;
+  bool holdsSome = kvfKeywordByNameNum(section, "ETLayer", 1) != nullptr;
+  for (const CYbSEKvfBase* list = GetFirstChild(); list; list = GetNextChild(list))
+    holdsSome = holdsSome || kvfSectionByNameNum(section, list->GetSectionName(), 1) != nullptr;
+  if (holdsSome)
+    kvfAddNote(
+        section, {},
+        "what Modflow is told of evapotranspiration here will not be saved: a setup has no place for it any more");
 }
 
 }  // namespace tervane

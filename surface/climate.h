@@ -70,10 +70,11 @@ class CPrecipitationRelatedKvf : public CTvnKvfBase {
 };
 inline constexpr ImportantName<CPrecipitationRelatedKvf> kClimate{"PRECIPITATIONRELATED"};
 
-/// What old files keep beside the climate: they hold the evapotranspiration here. Read and never written.
+/// What old files keep beside the climate: they hold the evapotranspiration here, and with Modflow where it is taken
+/// from. Read and never written.
 class CEvapotransKvf : public CTvnKvfBase {
  public:
-  explicit CEvapotransKvf(CYbSEKvfBase* parent) : CTvnKvfBase("Evapotranspiration", "Evapotrans", parent) {}
+  explicit CEvapotransKvf(CYbSEKvfBase* parent);
 
   int ETLayer = 0;  ///< With Modflow: 0 from the top layer, 1 from a given layer.
 
@@ -83,6 +84,10 @@ class CEvapotransKvf : public CTvnKvfBase {
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys.ReadOnly("ETLayer", ETLayer); }
+
+ private:
+  /// Tells of what the file holds here and no later one will.
+  void NoteWhatIsLost(KvfNode* section) const;
 };
 inline constexpr ImportantName<CEvapotransKvf> kOldEvapotranspiration{"Evapotrans"};
 

@@ -9,6 +9,7 @@
 namespace tervane {
 
 inline constexpr PageClass kClimatePage{"CPrecipitationRelatedDlg", 16539};
+inline constexpr PageClass kStressPeriodGridsPage{"CRechargeAndPondingModListDlg", 0};
 inline constexpr PageClass kPrecipitationPage{"CPrecipitationDlg", 16538};
 inline constexpr PageClass kPrecipitationStationPage{"CPrecTimeSeriesDlg", 16540};
 inline constexpr PageClass kPotEvapTransPage{"CPotEvapTransDlg", 16538};
