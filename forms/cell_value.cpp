@@ -54,7 +54,7 @@ std::string CellText(const CellValue& value, const FieldUnit& unit, const std::s
            [](int whole) { return std::to_string(whole); }, [&](float real) { return number(real); },
            [&](double real) { return number(real); }, [](const std::string& text) { return text; },
            [](const FileName& name) { return name.Text(); },
-           [](const CYbDateTime& date) { return date.Format(PageForm::kDateFormat); }},
+           [&](const CYbDateTime& date) { return date.Format(format.empty() ? PageForm::kDateFormat : format); }},
       value);
 }
 

@@ -37,7 +37,8 @@ CellValue ValueAt(const CellPlace& place);
 void StoreAt(const CellPlace& place, CellValue value);
 
 CellKind KindOf(const CellValue& value);
-/// The value as it is typed. `unit` and `format` (printf, of one double) are those of numbers.
+/// The value as it is typed. `unit` and `format` (printf, of one double) are those of numbers; of a
+/// date it is made of %Y %m %d %H %M.
 std::string CellText(const CellValue& value, const FieldUnit& unit = {}, const std::string& format = {});
 /// Takes a typed value of the same type; gives what was expected when it is none. `node` says to which folder a name of
 /// a file is relative; null where none is known.

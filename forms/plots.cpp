@@ -51,10 +51,10 @@ bool LooksSame(const Series& a, const Series& b) {
 
 bool LooksSame(const SeriesContent& a, const SeriesContent& b) {
   const auto sameMarker = [](const DateMarker& x, const DateMarker& y) {
-    return x.name == y.name && x.time == y.time && !x.moved == !y.moved;
+    return x.name == y.name && x.time == y.time && !x.moved == !y.moved && x.standsOut == y.standsOut;
   };
   return a.period == b.period && a.message == b.message && a.numbers == b.numbers && a.bars == b.bars &&
-         std::ranges::equal(a.markers, b.markers, sameMarker) &&
+         a.panelTitles == b.panelTitles && std::ranges::equal(a.markers, b.markers, sameMarker) &&
          std::ranges::equal(a.series, b.series, [](const Series& x, const Series& y) { return LooksSame(x, y); });
 }
 

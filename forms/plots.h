@@ -298,6 +298,7 @@ struct DateMarker {
   std::string name;
   CYbDateTime time;
   std::function<void(const CYbDateTime& time)> moved = {};  ///< The user has dragged it; empty where he may not.
+  bool standsOut = false;                                   ///< Before all others: what the user looks at.
 };
 
 /// A date that a page asks of the user on its chart: a click gives it, Esc gives up.
@@ -326,6 +327,8 @@ struct SeriesContent {
   std::vector<DateMarker> markers = {};
   std::optional<DateRequest> request = {};
   std::vector<TimeBar> bars = {};  ///< Ascending by their start.
+  /// Of the charts below each other, each in its corner; those beyond have none.
+  std::vector<std::string> panelTitles = {};
   std::optional<SeriesChoice> choice = {};
 
   bool IsEmpty() const { return series.empty(); }

@@ -50,7 +50,7 @@ struct TableColumn {
   std::string toolTip;              ///< Of the head, and of the cells that have none of their own.
   std::string unit;                 ///< A fixed unit of the numbers, as of a control.
   int itemType = 0;                 ///< The numbers are quantities of that item type; 0 for none.
-  std::string format;               ///< A printf format of one double in which numbers are shown, such as "%.6g".
+  std::string format;               ///< Numbers are shown by this printf format, such as "%.6g"; dates by "%Y-%m-%d".
   int hint = kDataChanged;          ///< Of a change in a cell.
   Host::FileQuestion fileQuestion;  ///< Of names of files.
   std::optional<CellKind> kind;     ///< Absent where it follows the value of each row.

@@ -77,6 +77,34 @@ class ListRows : public RowsOf<Item> {
   CYbSEKvfAbstractListBase<Item>& list_;
 };
 
+/// Of the items of a list those for which a rule holds, as they were when the table was last brought in step. They
+/// neither come nor go.
+template <class Item>
+class RowsThatHold : public RowsOf<Item> {
+ public:
+  RowsThatHold(CYbSEKvfAbstractListBase<Item>& list, std::function<bool(Item&)> rule)
+      : list_(list), rule_(std::move(rule)) {
+    RowsThatHold::Refresh();
+  }
+
+  int Count() const override { return static_cast<int>(shown_.size()); }
+  Item& At(int row) const override { return *shown_[static_cast<std::size_t>(row - 1)]; }
+  const void* Identity(int row) const override { return &At(row); }
+  const CYbSEKvfBase* Node(int row) const override { return &At(row); }
+  std::unique_ptr<Item> Sample() const override { return list_.NewItem(); }
+  bool Refresh() override {
+    std::vector<Item*> now;
+    for (int number = 1; number <= list_.GetItemCount(); ++number)
+      if (Item* item = list_.GetItem(number); rule_(*item)) now.push_back(item);
+    return std::exchange(shown_, now) != now;
+  }
+
+ private:
+  CYbSEKvfAbstractListBase<Item>& list_;
+  std::function<bool(Item&)> rule_;
+  std::vector<Item*> shown_;
+};
+
 /// Rows that stand elsewhere, which the user may look at in another order, or at some of them. They are kept as they
 /// were when the table was last brought in step.
 template <class Row>

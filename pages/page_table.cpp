@@ -6,7 +6,9 @@
 #include "pages/execution/processed_pages.h"
 #include "pages/simspec/components_pages.h"
 #include "pages/simspec/control_pages.h"
+#include "pages/simspec/modflow_pages.h"
 #include "pages/simspec/period_pages.h"
+#include "pages/simspec/stress_period_pages.h"
 #include "pages/spatial/data2d_pages.h"
 #include "pages/spatial/domain_pages.h"
 #include "pages/spatial/station_pages.h"
@@ -27,6 +29,7 @@
 #include "pages/surface/land_use_pages.h"
 #include "pages/surface/overland_pages.h"
 #include "pages/surface/river_pages.h"
+#include "pages/surface/stress_period_grid_pages.h"
 #include "pages/surface/vegetation_pages.h"
 #include "pages/whole_pages.h"
 #include "pages/wqpt/kinetra_pages.h"
@@ -50,6 +53,8 @@ constexpr PageFile kFiles[] = {
     {"simspec", ComponentsPages},
     {"simspec", ControlPages},
     {"simspec", PeriodPages},
+    {"simspec", StressPeriodPages},
+    {"simspec", ModflowPages},
     {"spatial", Data2DPages},
     {"spatial", DomainPages},
     {"spatial", StationPages},
@@ -60,6 +65,7 @@ constexpr PageFile kFiles[] = {
     {"surface", OverlandPages},
     {"surface", IrrigationPages},
     {"surface", RiverPages},
+    {"surface", StressPeriodGridPages},
     {"subsurface", UnsaturatedZonePages},
     {"subsurface", SoilPages},
     {"subsurface", SaturatedZonePages},

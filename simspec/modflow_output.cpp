@@ -169,6 +169,7 @@ COutputModKvf::COutputModKvf(CYbSEKvfBase* parent)
       dates_(NewChild<COutputModDatesListKvf>()),
       timeSteps_(NewChild<COutputModTimestepListKvf>()),
       packages_(NewChild<COutputModPackageListKvf>()) {
+  SetPage(kModflowOutputPage);
   TakesPartWhen(AnyModflow());
 }
 

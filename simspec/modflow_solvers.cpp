@@ -190,6 +190,7 @@ void CCompControlParaModSORKvf::ExchangeKeys(KeyExchange& keys) {
 
 CCompControlParaModKvf::CCompControlParaModKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Subsurface Computational Control Parameters", "CompControlParaModSZ", parent) {
+  SetPage(kControlModflowPage);
   TakesPartWhen(AnyModflow());
   NewChild<CCompControlParaModLMGKvf>();
   NewChild<CCompControlParaModPCG2Kvf>();
@@ -222,6 +223,7 @@ constexpr KeyChoice kWeightings[] = {{CCompControlParaModPackageKvf::kUpstream, 
 
 CCompControlParaModPackageKvf::CCompControlParaModPackageKvf(CYbSEKvfBase* parent)
     : CTvnKvfBase("Package Control Parameters", "CompControlParaModPackage", parent) {
+  SetPage(kModflowPackagePage);
   TakesPartWhen(AnyModflow() && ModflowComponent(&CModModelCompKvf::Subsurface));
 }
 

@@ -38,6 +38,18 @@ std::string TextOf(const CYbDateTime& date) { return date.Format(CStressPeriodsK
 
 }  // namespace
 
+TimeStepRange TimeStepsOf(double length, const StressPeriodSteps& steps) {
+  const double factor = steps.TSMULT, count = steps.NSTP;
+  if (!(count >= 1) || !(factor > 0)) return {std::nan(""), std::nan("")};
+  if (factor == 1) return {length / count, length / count};
+  // The power is small or large, and never too large for a number.
+  const double first = factor < 1 ? length * (factor - 1) / (std::pow(factor, count) - 1)
+                                  : length * (factor - 1) * std::pow(factor, -count) / (1 - std::pow(factor, -count));
+  const double last = factor < 1 ? first * std::pow(factor, count - 1)
+                                 : length * (factor - 1) / (factor * (1 - std::pow(factor, -count)));
+  return {first, last};
+}
+
 // ---- A period
 
 CStressPeriodsItemKvf::CStressPeriodsItemKvf(CYbSEKvfBase* list)
@@ -74,6 +86,7 @@ void CStressPeriodsItemKvf::ExchangeKeys(KeyExchange& keys) {
 
 CStressPeriodsPropListKvf::CStressPeriodsPropListKvf(CYbSEKvfBase* list)
     : CTvnKvfBase("Stress Period Properties", "STRESSPERIOD_PROPPAGE", list) {
+  SetPage(kStressPeriodPropertiesPage);
   TakesPartWhen(IsInParent(&CStressPeriodsKvf::MfSteadyState, {0}));
 }
 
@@ -81,6 +94,7 @@ CStressPeriodsPropListKvf::CStressPeriodsPropListKvf(CYbSEKvfBase* list)
 
 CStressPeriodsKvf::CStressPeriodsKvf(CYbSEKvfBase* parent)
     : CYbSEKvfListBase("Stress Periods", "STRESSPERIODS", parent) {
+  SetPage(kStressPeriodsPage);
   TakesPartWhen(!OwnEngine());
   NewChild<CStressPeriodsPropListKvf>();
   CYbSEKvfListBase::SetItemCount(1, 1);
@@ -102,6 +116,12 @@ std::string CStressPeriodsKvf::GetDateText(int number) const {
   if (number == 0) return TextOf(SimulationOf(*this).start);
   const CStressPeriodsItemKvf* item = GetItem(number);
   return item ? TextOf(item->EndDate()) : "ERROR";
+}
+
+CYbDateTimeSpan CStressPeriodsKvf::LengthOf(int number) const {
+  const CStressPeriodsItemKvf *item = GetItem(number), *before = GetItem(number - 1);
+  if (!item) return {};
+  return item->EndDate() - (before ? before->EndDate() : SimulationOf(*this).start);
 }
 
 void CStressPeriodsKvf::FixLastPeriod() {

@@ -24,6 +24,13 @@ struct StressPeriodSteps {
   double SSTR = 0;     ///< Whether the period is one step in steady state, 1 or 0.
 };
 
+/// The first and the last of the time steps of a period of that length, each of which is the multiplier times the one
+/// before it; NaN where these make no steps. In the unit of the length.
+struct TimeStepRange {
+  double first, last;
+};
+TimeStepRange TimeStepsOf(double length, const StressPeriodSteps& steps);
+
 class CStressPeriodsKvf;
 
 /// A period.
@@ -66,6 +73,8 @@ class CStressPeriodsKvf : public CYbSEKvfListBase<CStressPeriodsItemKvf> {
   std::vector<CYbDateTime> GetDateMarkers() const;
   /// When a period ends, and with 0 when the first begins; "ERROR" for a period that is none.
   std::string GetDateText(int number) const;
+  /// From the end of the period before, or the start of the simulation.
+  CYbDateTimeSpan LengthOf(int number) const;
   /// The last period ends with the simulation.
   void FixLastPeriod();
   /// Makes that many periods of one length in the place of those that there are. They step by `steps`, but for the

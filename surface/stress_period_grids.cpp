@@ -60,6 +60,7 @@ int CRechargeAndPondingModItemKvf::ValidateData() {
 CRechargeAndPondingModListKvf::CRechargeAndPondingModListKvf(const StressPeriodGridsKind& kind, Condition takesPart,
                                                              CYbSEKvfBase* parent)
     : CYbSEKvfAbstractListBase(std::string(kind.title), std::string(kind.section), parent), kind_(kind) {
+  SetPage(kStressPeriodGridsPage);
   TakesPartWhen(std::move(takesPart));
 }
 

@@ -8,6 +8,7 @@
 #include <QMouseEvent>
 #include <algorithm>
 #include <cmath>
+#include <optional>
 #include <utility>
 
 #include <qcustomplot.h>
@@ -22,6 +23,7 @@ namespace {
 
 constexpr double kReach = 5;  ///< How near the pointer must be to a marker, in pixels at zoom 1.
 constexpr double kClickRadius = 4;
+constexpr std::size_t kMostNames = 60;  ///< More could not be read.
 
 const QColor kMarkerColor(0xd1, 0x45, 0x3b);
 
@@ -38,35 +40,69 @@ ChartMarkers::ChartMarkers(QCustomPlot& chart) : QObject(&chart), chart_(chart),
   chart_.installEventFilter(this);
 }
 
+/// The lines of all markers in one chart. There may be thousands: a pixel is drawn once.
+class ChartMarkers::Lines : public QCPAbstractItem {
+ public:
+  Lines(const ChartMarkers& markers, QCPAxisRect& chart)
+      : QCPAbstractItem(chart.parentPlot()), markers_(markers), chart_(chart) {
+    setClipToAxisRect(true);
+    setClipAxisRect(&chart);
+    setSelectable(false);
+  }
+  double selectTest(const QPointF& /*place*/, bool /*onlySelectable*/, QVariant* /*details*/) const override {
+    return -1;
+  }
+
+ protected:
+  void draw(QCPPainter* painter) override {
+    const QCPAxis& times = *chart_.axis(QCPAxis::atBottom);
+    const double width = 1.6 * Theme::Get().Zoom();
+    std::optional<int> last;
+    for (const bool standsOut : {false, true}) {
+      for (std::size_t i = 0; i < markers_.places_.size(); ++i) {
+        const DateMarker& marker = markers_.markers_[i];
+        const double at = times.coordToPixel(markers_.places_[i]);
+        const int pixel = static_cast<int>(std::lround(at));
+        if (marker.standsOut != standsOut || at < chart_.left() - width || at > chart_.right() + width) continue;
+        if (last == pixel && !standsOut) continue;
+        last = pixel;
+        painter->setPen(QPen(kMarkerColor, standsOut ? 2 * width : width, marker.moved ? Qt::SolidLine : Qt::DashLine));
+        painter->drawLine(QLineF(at, chart_.top(), at, chart_.bottom()));
+      }
+    }
+  }
+
+ private:
+  const ChartMarkers& markers_;
+  QCPAxisRect& chart_;
+};
+
+void ChartMarkers::MakeName(const DateMarker& marker) {
+  auto* name = new QCPItemText(&chart_);
+  name->position->setAxisRect(charts_.front());
+  name->position->setAxes(charts_.front()->axis(QCPAxis::atBottom), charts_.front()->axis(QCPAxis::atLeft));
+  name->position->setTypeX(QCPItemPosition::ptPlotCoords);
+  name->position->setTypeY(QCPItemPosition::ptAxisRectRatio);
+  name->setClipAxisRect(charts_.front());
+  name->setText(ToQt(marker.name));
+  names_.push_back(name);
+}
+
 void ChartMarkers::Show(const std::vector<DateMarker>& markers, const std::vector<QCPAxisRect*>& charts) {
   // The items themselves went with the chart's content.
-  drawn_.clear();
+  names_.clear();
+  lines_.clear();
+  places_.clear();
   dragged_.reset();
   charts_ = charts;
   markers_ = markers;
   std::erase_if(markers_, [](const DateMarker& marker) { return !marker.time.IsValid(); });
+  if (markers_.empty()) return;
+  for (QCPAxisRect* rect : charts_) lines_.push_back(new Lines(*this, *rect));
   for (const DateMarker& marker : markers_) {
-    Drawn drawn;
-    for (QCPAxisRect* rect : charts_) {
-      auto* line = new QCPItemLine(&chart_);
-      for (QCPItemPosition* end : {line->start, line->end}) {
-        end->setAxisRect(rect);
-        end->setAxes(rect->axis(QCPAxis::atBottom), rect->axis(QCPAxis::atLeft));
-        end->setTypeX(QCPItemPosition::ptPlotCoords);
-        end->setTypeY(QCPItemPosition::ptAxisRectRatio);
-      }
-      line->setClipAxisRect(rect);
-      drawn.lines.push_back(line);
-    }
-    drawn.name = new QCPItemText(&chart_);
-    drawn.name->position->setAxisRect(charts_.front());
-    drawn.name->position->setAxes(charts_.front()->axis(QCPAxis::atBottom), charts_.front()->axis(QCPAxis::atLeft));
-    drawn.name->position->setTypeX(QCPItemPosition::ptPlotCoords);
-    drawn.name->position->setTypeY(QCPItemPosition::ptAxisRectRatio);
-    drawn.name->setClipAxisRect(charts_.front());
-    drawn.name->setText(ToQt(marker.name));
-    drawn_.push_back(drawn);
-    Place(drawn_.size() - 1, AxisCoordinate(marker.time));
+    if (markers_.size() <= kMostNames) MakeName(marker);
+    places_.push_back(0);
+    Place(places_.size() - 1, AxisCoordinate(marker.time));
   }
   ApplyTheme();
 }
@@ -78,41 +114,35 @@ void ChartMarkers::SetMoves(const std::vector<DateMarker>& markers) {
 }
 
 void ChartMarkers::Place(std::size_t marker, double at) {
-  for (QCPItemLine* line : drawn_[marker].lines) {
-    line->start->setCoords(at, 0);
-    line->end->setCoords(at, 1);
-  }
-  drawn_[marker].name->position->setCoords(at, drawn_[marker].name->position->value());
+  places_[marker] = at;
+  if (!names_.empty()) names_[marker]->position->setCoords(at, names_[marker]->position->value());
 }
 
 void ChartMarkers::ApplyTheme() {
   const Theme& theme = Theme::Get();
-  for (std::size_t i = 0; i < drawn_.size(); ++i) {
-    for (QCPItemLine* line : drawn_[i].lines)
-      line->setPen(QPen(kMarkerColor, 1.6 * theme.Zoom(), markers_[i].moved ? Qt::SolidLine : Qt::DashLine));
-    QCPItemText& name = *drawn_[i].name;
-    name.setFont(QApplication::font());
-    name.setColor(QApplication::palette().color(QPalette::Text));
+  for (QCPItemText* name : names_) {
+    name->setFont(QApplication::font());
+    name->setColor(QApplication::palette().color(QPalette::Text));
     QColor paper = QApplication::palette().color(QPalette::Base);
     paper.setAlpha(215);
-    name.setBrush(paper);
-    name.setPen(QPen(kMarkerColor, 1));
+    name->setBrush(paper);
+    name->setPen(QPen(kMarkerColor, 1));
     const int margin = theme.Scaled(3);
-    name.setPadding({margin, 0, margin, 0});
+    name->setPadding({margin, 0, margin, 0});
   }
 }
 
 void ChartMarkers::Arrange() {
-  if (drawn_.empty() || charts_.front()->height() <= 0) return;
+  if (names_.empty() || charts_.front()->height() <= 0) return;
   const QFontMetrics metrics(QApplication::font());
   const QCPAxis& times = *charts_.front()->axis(QCPAxis::atBottom);
   const double margin = Theme::Get().Scaled(5), line = metrics.height() + 2.0;
-  std::vector<std::size_t> order(drawn_.size());
+  std::vector<std::size_t> order(names_.size());
   for (std::size_t i = 0; i < order.size(); ++i) order[i] = i;
-  std::ranges::sort(order, {}, [&](std::size_t i) { return drawn_[i].name->position->key(); });
+  std::ranges::sort(order, {}, [&](std::size_t i) { return places_[i]; });
   std::vector<double> ends;  // of the names in each line
   for (const std::size_t i : order) {
-    QCPItemText& name = *drawn_[i].name;
+    QCPItemText& name = *names_[i];
     const double at = times.coordToPixel(name.position->key());
     const double width = metrics.horizontalAdvance(name.text()) + 2 * margin;
     // On the left of its line where there is no room on the right.
@@ -167,8 +197,8 @@ std::optional<std::size_t> ChartMarkers::MarkerAt(QPointF pointer) const {
   const QCPAxis& times = *charts_.front()->axis(QCPAxis::atBottom);
   std::optional<std::size_t> found;
   double nearest = kReach * Theme::Get().Zoom();
-  for (std::size_t i = 0; i < drawn_.size(); ++i) {
-    const double distance = std::abs(times.coordToPixel(drawn_[i].name->position->key()) - pointer.x());
+  for (std::size_t i = 0; i < places_.size(); ++i) {
+    const double distance = std::abs(times.coordToPixel(places_[i]) - pointer.x());
     if (!markers_[i].moved || distance >= nearest) continue;
     nearest = distance;
     found = i;
@@ -206,7 +236,7 @@ bool ChartMarkers::Move(const QMouseEvent& event) {
 bool ChartMarkers::Release(const QMouseEvent& event) {
   if (dragged_) {
     const std::size_t marker = *std::exchange(dragged_, {});
-    const CYbDateTime time = CYbDateTime::FromSecondsSinceEpoch(std::llround(drawn_[marker].name->position->key()));
+    const CYbDateTime time = CYbDateTime::FromSecondsSinceEpoch(std::llround(places_[marker]));
     // The page may be shown anew by what the move does.
     const auto moved = markers_[marker].moved;
     if (time != markers_[marker].time) {

@@ -10,7 +10,6 @@
 #include "forms/plots.h"
 
 class QCPAxisRect;
-class QCPItemLine;
 class QCPItemText;
 class QCustomPlot;
 class QLabel;
@@ -40,16 +39,14 @@ class ChartMarkers : public QObject {
   bool eventFilter(QObject* watched, QEvent* event) override;
 
  private:
-  struct Drawn {
-    std::vector<QCPItemLine*> lines;
-    QCPItemText* name = nullptr;
-  };
+  class Lines;
 
   bool Press(const QMouseEvent& event);
   bool Move(const QMouseEvent& event);
   bool Release(const QMouseEvent& event);
   void GiveUp();
   void Place(std::size_t marker, double at);
+  void MakeName(const DateMarker& marker);
   std::optional<std::size_t> MarkerAt(QPointF pointer) const;
   double PerPixel() const;
   bool IsInside(QPointF pointer) const;
@@ -57,7 +54,9 @@ class ChartMarkers : public QObject {
   QCustomPlot& chart_;
   QLabel* prompt_;
   std::vector<DateMarker> markers_;
-  std::vector<Drawn> drawn_;
+  std::vector<double> places_;       ///< Of the markers on the axis of time, also while they are dragged.
+  std::vector<Lines*> lines_;        ///< Of all markers, in each of the charts.
+  std::vector<QCPItemText*> names_;  ///< As many as markers, or none where they are too many to be read.
   std::vector<QCPAxisRect*> charts_;
   std::optional<DateRequest> request_;
   std::optional<std::size_t> dragged_;

@@ -161,13 +161,17 @@ void SeriesPlot::Build() {
   periods_.clear();
   hatches_.clear();
   pointers_.clear();
+  titles_.clear();
   bars_ = nullptr;
   int panels = 1;
   for (const Series& series : content_.series) panels = std::max(panels, series.panel + 1);
   const bool hasBars = !content_.IsEmpty() && !content_.numbers && !content_.bars.empty();
   panels_->SetUp(panels, hasBars, content_.numbers);
   if (hasBars) BuildStrip();
-  chart_->setMinimumHeight(Theme::Get().Scaled(hasBars ? 260 : 140));
+  // Of each of several charts, and of the axis below the last one.
+  constexpr int kPanelHeight = 100, kAxisHeight = 54;
+  const int least = std::max(hasBars ? 260 : 140, panels > 1 ? panels * kPanelHeight + kAxisHeight : 0);
+  chart_->setMinimumHeight(Theme::Get().Scaled(least));
   for (int panel = 0; panel < panels; ++panel) BuildPanel(panel);
   message_->setText(content_.message.empty() ? tr("There is nothing to show.") : Translated(content_.message));
   message_->setVisible(content_.IsEmpty());
@@ -203,8 +207,22 @@ void SeriesPlot::BuildPanel(int panel) {
   right.setTickLabels(hasSecond);
   right.setTicks(hasSecond);
   if (content_.IsEmpty()) return;
+  if (static_cast<std::size_t>(panel) < content_.panelTitles.size())
+    AddTitle(*left.axisRect(), content_.panelTitles[static_cast<std::size_t>(panel)]);
   AddPeriodAndPointer(keys, left);
   if (!content_.numbers) MarkMissing(panel);
+}
+
+void SeriesPlot::AddTitle(QCPAxisRect& rect, const std::string& text) {
+  auto* title = new QCPItemText(chart_);
+  title->setClipAxisRect(&rect);
+  title->position->setAxisRect(&rect);
+  title->position->setType(QCPItemPosition::ptAxisRectRatio);
+  title->position->setCoords(0, 0);
+  title->setPositionAlignment(Qt::AlignLeft | Qt::AlignTop);
+  title->setPadding({4, 2, 4, 2});
+  title->setText(Translated(text));
+  titles_.push_back(title);
 }
 
 void SeriesPlot::BuildStrip() {
@@ -324,6 +342,10 @@ void SeriesPlot::ApplyTheme() {
   for (QCPItemRect* hatch : hatches_) {
     hatch->setBrush(QBrush(missing, Qt::BDiagPattern));
     hatch->setPen(Qt::NoPen);
+  }
+  for (QCPItemText* title : titles_) {
+    title->setFont(QApplication::font());
+    title->setColor(colors.color(QPalette::Text));
   }
   for (QCPItemStraightLine* pointer : pointers_) pointer->setPen(QPen(quiet, 1, Qt::DashLine));
   QPalette quietText = colors;

@@ -12,8 +12,10 @@
 
 class QActionGroup;
 class QCPAxis;
+class QCPAxisRect;
 class QCPGraph;
 class QCPItemStraightLine;
+class QCPItemText;
 class QCPItemRect;
 class QCustomPlot;
 class QLabel;
@@ -65,6 +67,7 @@ class SeriesPlot : public PlotFrame {
   /// One of the charts below each other.
   void BuildPanel(int panel);
   /// The strip above the charts, with the bars.
+  void AddTitle(QCPAxisRect& rect, const std::string& text);
   void BuildStrip();
   /// The simulated time and the line at the pointer.
   void AddPeriodAndPointer(QCPAxis& keys, QCPAxis& values);
@@ -94,6 +97,7 @@ class SeriesPlot : public PlotFrame {
   std::vector<QCPItemRect*> periods_;  ///< Of each chart.
   std::vector<QCPItemRect*> hatches_;  ///< Where there are no data.
   std::vector<QCPItemStraightLine*> pointers_;
+  std::vector<QCPItemText*> titles_;
 };
 
 }  // namespace tervane
