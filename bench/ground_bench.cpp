@@ -12,10 +12,9 @@
 #include <vector>
 
 #include <fmt/format.h>
-#include <malloc.h>
 
 #include "bench/median_table.h"
-#include "document/edit_session.h"
+#include "bench/whole_setup.h"
 #include "forms/section_profile.h"
 #include "libraries/wells.h"
 #include "spatial/domain_boundary.h"
@@ -141,19 +140,6 @@ void MakeLayers(CFlowModelDoc& setup, int count) {
   }
 }
 
-std::string TextOf(const CFlowModelDoc& setup) {
-  std::string text, error;
-  if (!setup.BuildText("/setups", text, error)) fmt::print("WRONG: not saved: {}\n", error);
-  return text;
-}
-
-int NodesBelow(const CYbSEKvfBase& node) {
-  int count = 0;
-  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
-    count += 1 + NodesBelow(*child);
-  return count;
-}
-
 int TakingPartBelow(CYbSEKvfBase& node) {
   int count = 0;
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
@@ -181,45 +167,32 @@ struct LayeredSetup {
   }
 };
 
-/// A setup that is edited, with undo.
-struct EditedSetup {
-  std::unique_ptr<EditSession> session = EditSession::New({});
+/// Layers that are edited.
+struct EditedLayers : EditedSetup {
   CGeoLayerSZKvf& layers = session->Document().Root().Important(kSaturatedZone)->Layers();
-  std::vector<std::string> names;
 
-  EditedSetup(int count, MedianTable& table) {
-    const std::size_t before = mallinfo2().uordblks;
+  EditedLayers(int count, MedianTable& table) : EditedSetup(fmt::format("{} layers", count)) {
     MakeLayers(session->Document(), count);
     session->UpdateDoc(layers, 1, "Make Layers");
-    fmt::print("editing {} layers, {} nodes: {} MB\n", count, NodesBelow(session->Document().Root()),
-               (mallinfo2().uordblks - before) / 1'000'000);
-    const auto add = [&](const std::string& what, double limit, const auto& measured) {
-      names.push_back(fmt::format("{}, {} layers", what, count));
-      table.Add(names.back(), measured);
-      table.LimitTime(names.back(), limit);
-    };
+    fmt::print("editing {}, {} nodes: {} MB\n", label, NodesBelow(session->Document().Root()), memory.Megabytes());
     const double structure = count > kMany ? 100 : 50;
-    add("type a value", 50, [this] {
+    Add(table, "type a value", 50, 1, [this]() -> CYbSEKvfBase& {
       CData2DKvf& level = *layers.GetItem(layers.GetItemCount() / 2)->Child<CData2DKvf>();
       level.FixedValue += 1;
-      session->UpdateDoc(level, 1, "Change Lower Level");
-      return session->Steps().CanUndo();
+      return level;
     });
-    add("undo and redo a value", 100, [this] { return session->Undo() && session->Redo(); });
-    add("rename a layer", structure, [this] {
+    AddUndo(table, 100);
+    Add(table, "rename a layer", structure, 1, [this]() -> CYbSEKvfBase& {
       layers.GetItem(1)->Name += "x";
-      session->UpdateDoc(layers, 1, "Rename Layer");
-      return session->Steps().CanUndo();
+      return layers;
     });
-    add("add a layer", structure, [this] {
+    Add(table, "add a layer", structure, 2, [this]() -> CYbSEKvfBase& {
       layers.InsertItem(2, 1);
-      session->UpdateDoc(layers, 2, "Add Layer");
-      return session->Steps().CanUndo();
+      return layers;
     });
-    add("delete a layer", structure, [this] {
+    Add(table, "delete a layer", structure, 4, [this]() -> CYbSEKvfBase& {
       layers.DeleteItem(2, 1);
-      session->UpdateDoc(layers, 4, "Delete Layer");
-      return session->Steps().CanUndo();
+      return layers;
     });
   }
 };
@@ -258,7 +231,7 @@ int Run(int argc, char** argv) {
   for (const char* what : {"open ", "validate ", "save ", "who takes part, "})
     table.Limit(what + many.label, what + few.label, 11);
   table.LimitTime("who takes part, " + many.label, 20);
-  const EditedSetup edited(kMany, table), full(kVeryMany, table);
+  const EditedLayers edited(kMany, table), full(kVeryMany, table);
   table.Run(argc, argv);
   return 0;
 }

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <chrono>
+#include <unordered_map>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
@@ -57,11 +58,20 @@ std::vector<KinetraBinding> Unbound(const std::vector<CKinetraSolverItem>& items
   return bindings;
 }
 
-KinetraBinding* FindBinding(std::vector<KinetraBinding>& bindings, const std::string& symbol) {
-  const auto found = std::ranges::find_if(
-      bindings, [&](const KinetraBinding& binding) { return EqualIgnoringCase(binding.item->symbol, symbol); });
-  return found == bindings.end() ? nullptr : &*found;
-}
+/// Bindings by their symbols, of which a template may have very many. Of two that differ in case only the first counts.
+class BindingIndex {
+ public:
+  explicit BindingIndex(std::vector<KinetraBinding>& bindings) {
+    for (KinetraBinding& binding : bindings) bindings_.try_emplace(LowerCase(binding.item->symbol), &binding);
+  }
+  KinetraBinding* Find(const std::string& symbol) const {
+    const auto found = bindings_.find(LowerCase(symbol));
+    return found == bindings_.end() ? nullptr : found->second;
+  }
+
+ private:
+  std::unordered_map<std::string, KinetraBinding*> bindings_;
+};
 
 /// The symbols that need values of their own.
 std::vector<std::string> SymbolsWithValues(const std::vector<KinetraBinding>& bindings) {
@@ -83,12 +93,14 @@ void CKinetraSolver::Load() {
   content_ = ReadKinetraTemplate(file.IsEmpty() ? std::string() : file.Absolute());
   constants = Unbound(content_->constants);
   forcings = Unbound(content_->forcings);
-  for (auto [bindings, old] : {std::pair{&constants, &oldConstants}, std::pair{&forcings, &oldForcings}})
+  for (auto [bindings, old] : {std::pair{&constants, &oldConstants}, std::pair{&forcings, &oldForcings}}) {
+    const BindingIndex oldBindings(*old);
     for (KinetraBinding& binding : *bindings)
-      if (const KinetraBinding* same = FindBinding(*old, binding.item->symbol)) {
+      if (const KinetraBinding* same = oldBindings.Find(binding.item->symbol)) {
         binding.dataType = same->dataType;
         binding.unit = same->unit;
       }
+  }
 }
 
 std::vector<int> CKinetraSolver::BoundNumbers() const {
@@ -142,8 +154,9 @@ void CKinetraCompSpecKvf::ExchangeKeys(KeyExchange& keys) {
   keys.Lines(isOfForcings_ ? "NumberOfForcings" : "NumberOfConstants", key, lines);
   if (!keys.Section()) return;
   std::vector<std::string> unknown;
+  const BindingIndex bindings(Bindings());
   for (const KeyLine& line : lines) {
-    if (KinetraBinding* binding = FindBinding(Bindings(), line.text)) {
+    if (KinetraBinding* binding = bindings.Find(line.text)) {
       binding->dataType = line.first;
       binding->unit = line.second;
     } else {
