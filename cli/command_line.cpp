@@ -53,7 +53,7 @@ constexpr CommandFile kFiles[] = {
     {OfferRunCommand, {"run"}},
     {OfferDataCommands},
     {OfferImports},
-    {OfferExportCommand},
+    {OfferExportCommands},
     {OfferCompletion},
 };
 
@@ -87,6 +87,11 @@ namespace {
 std::string WhyNoCommand(const CLI::App& app, std::span<const std::string> words) {
   const std::vector<const CLI::App*> commands = app.get_subcommands([](const CLI::App*) { return true; });
   if (commands.empty() || words.empty() || words.front().starts_with('-')) return {};
+  // One that has commands below it and takes words itself cannot tell a name that is meant as a command.
+  const bool takesWords = !app.get_options([](const CLI::Option* option) { return option->get_positional(); }).empty();
+  if (takesWords &&
+      std::ranges::none_of(commands, [&](const CLI::App* command) { return command->get_name() == words.front(); }))
+    return {};
   std::vector<std::string> names;
   for (const CLI::App* command : commands) {
     if (command->get_name() == words.front()) return WhyNoCommand(*command, words.subspan(1));
@@ -102,7 +107,10 @@ std::string WhyNoCommand(const CLI::App& app, std::span<const std::string> words
 Command CommandOffers::Offer(const char* name, const char* description, std::function<int()> run,
                              const Command* family) {
   CLI::App* command = (family ? family->app_ : &app_)->add_subcommand(name, description);
-  command->callback([&status = status_, run = std::move(run)] { status = run(); });
+  // CLI11 calls the commands above the one that is meant, too.
+  command->callback([&status = status_, run = std::move(run), command] {
+    if (command->get_subcommands().empty()) status = run();
+  });
   return Command(command);
 }
 

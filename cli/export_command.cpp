@@ -63,6 +63,8 @@ FileResult WriteRaster(const DataFile& file, const Export& wanted) {
 }
 
 int ExportCommand(const Export& wanted, Streams streams) {
+  if (wanted.in.empty() || wanted.out.empty())
+    return Refuse(streams, "name the data file and the file to write: tervane export FILE OUT");
   DataFile file;
   if (const std::string error = file.Open(wanted.in); !error.empty()) return Refuse(streams, error);
   const std::string_view extension = ExtensionOf(wanted.out);
@@ -86,18 +88,19 @@ int ExportCommand(const Export& wanted, Streams streams) {
 
 }  // namespace
 
-void OfferExportCommand(CommandOffers& offers) {
+void OfferExportCommands(CommandOffers& offers) {
   auto options = std::make_shared<Export>();
   Command exporting = offers.Offer("export", "Write time series (.nds0) as a table (CSV), or a grid as GeoTIFF",
                                    [offers, options] { return ExportCommand(*options, offers.Output()); });
-  exporting.Add("FILE", options->in, "The data file").Required();
-  exporting.Add("OUT", options->out, "The file to write: a GeoTIFF when it ends in .tif, else a table").Required();
+  exporting.Add("FILE", options->in, "The data file");
+  exporting.Add("OUT", options->out, "The file to write: a GeoTIFF when it ends in .tif, else a table");
   exporting.Add("--item", options->item, "The item of a grid, from 1; the first without it").Positive();
   exporting.Add("--step", options->step, "Its time step, from 1; the first without it").Positive();
   exporting.Add("--layer", options->layer, "Its layer, from 1 at the bottom; the lowest without it").Positive();
   exporting.AddChoice<CsvStamps>("--stamps", options->stamps, {{"begin", CsvStamps::Begins}, {"end", CsvStamps::Ends}},
                                  "Which end of its interval a date of a table is; end without it");
   exporting.AddFlag("--force", options->force, "Replace a file that exists");
+  OfferModflow6Export(offers, exporting);
 }
 
 }  // namespace tervane

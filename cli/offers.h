@@ -60,7 +60,8 @@ void OfferSeriesImport(CommandOffers& offers, const Command& family);
 void OfferGridImport(CommandOffers& offers, const Command& family);
 void OfferRiverImport(CommandOffers& offers, const Command& family);
 void OfferWellImport(CommandOffers& offers, const Command& family);
-void OfferExportCommand(CommandOffers& offers);
+void OfferExportCommands(CommandOffers& offers);
+void OfferModflow6Export(CommandOffers& offers, const Command& family);
 void OfferCompletion(CommandOffers& offers);
 
 }  // namespace tervane

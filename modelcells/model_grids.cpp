@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "modelcells/model_grids.h"
 
+#include <algorithm>
 #include <cmath>
 
 #include <fmt/format.h>
@@ -45,6 +46,39 @@ std::string PutOnModel(const CTvn2DOrthoRotatedGridData& source, const GridGeome
     return std::string();
   };
   return Resample(task, SuitableResampling(task, areCodes), values);
+}
+
+FileResult MeanOfGrids(const std::string& path, int item, std::int64_t start, std::int64_t end,
+                       CTvn2DOrthoRotatedGridData& mean) {
+  // The first step brings geometry and unit.
+  if (FileResult read = ReadGridData(path, item, mean); !read.Ok()) return read;
+  DataFile file;
+  if (const std::string error = file.Open(path); !error.empty()) return {error, {}};
+  const TimeAxis& time = file.Time();
+  if (!time.hasDates) return {};
+  const bool isAmount = file.Items()[static_cast<std::size_t>(item) - 1].valueType == ValueType::StepAccumulated;
+  const std::size_t cells = mean.Geometry().CellCount();
+  std::vector<double> sums(cells, 0.0), seconds(cells, 0.0);
+  std::vector<float> values(cells);
+  for (std::size_t step = 0; step < time.steps; ++step) {
+    const std::int64_t begin = step > 0     ? time.stamps[step - 1]
+                               : time.begin ? time.begin->SecondsSinceEpoch()
+                                            : time.stamps[0] - time.stepSeconds;
+    const auto shared = static_cast<double>(std::min(end, time.stamps[step]) - std::max(start, begin));
+    if (shared <= 0) continue;
+    if (const std::string error = file.Read({item, step, 1, {}}, values, mean.ItemType()); !error.empty())
+      return {error, {}};
+    const double weight = isAmount ? shared / static_cast<double>(time.stamps[step] - begin) : shared;
+    for (std::size_t cell = 0; cell < cells; ++cell) {
+      if (values[cell] == kDeleteValue) continue;
+      sums[cell] += static_cast<double>(values[cell]) * weight;
+      seconds[cell] += shared;
+    }
+  }
+  float* means = mean.GetData();
+  for (std::size_t cell = 0; cell < cells; ++cell)
+    means[cell] = seconds[cell] > 0 ? static_cast<float>(sums[cell] / seconds[cell]) : mean.DeleteValue();
+  return {};
 }
 
 int ModelGridFile::Add(ModelGrid grid) {

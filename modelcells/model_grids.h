@@ -4,6 +4,7 @@
 // The quantities of a setup on the cells of its model, in one data file.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <map>
 #include <string>
@@ -25,6 +26,12 @@ GridMaker MakeQuantity(const CData2DKvf& quantity, const GridGeometry& model);
 /// The values of a grid on the model's cells, in one plane with it; kDeleteValue where it has none. "" or why not.
 std::string PutOnModel(const CTvn2DOrthoRotatedGridData& source, const GridGeometry& model, bool areCodes,
                        std::vector<float>& values);
+
+/// The mean of an item of grids over the time from `start` to `end` (seconds since 1970-01-01), by cell, in the base
+/// unit of its item type; of amounts over steps their rate per second. A value holds over the step that its stamp ends;
+/// a file without dates holds always. A cell without a value then is empty.
+FileResult MeanOfGrids(const std::string& path, int item, std::int64_t start, std::int64_t end,
+                       CTvn2DOrthoRotatedGridData& mean);
 
 /// A quantity that is to be put on the model's cells.
 struct ModelGrid {

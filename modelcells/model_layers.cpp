@@ -25,19 +25,6 @@ namespace {
 
 constexpr int kMetre = 1000;
 
-/// Elevations of a quantity on the cells of the domain. "" or why not.
-std::string LevelsOn(const CTvn2DOrthoRotatedGridData& domain, const CData2DKvf& quantity,
-                     const std::vector<float>& ground, std::vector<float>& levels) {
-  CTvn2DOrthoRotatedGridData grid;
-  if (const FileResult made = MakeQuantity(quantity, domain.Geometry())(grid); !made.Ok()) return made.error;
-  if (std::string problem = PutOnModel(grid, domain.Geometry(), false, levels); !problem.empty()) return problem;
-  if (!quantity.HasRelativeToGround() || quantity.RelativeToGround == 0) return {};
-  for (std::size_t cell = 0; cell < levels.size(); ++cell)
-    if (levels[cell] != kDeleteValue)
-      levels[cell] = ground[cell] == kDeleteValue ? kDeleteValue : ground[cell] + levels[cell];
-  return {};
-}
-
 void EmptyOutside(const CTvn2DOrthoRotatedGridData& domain, std::vector<float>& values) {
   for (std::size_t cell = 0; cell < values.size(); ++cell)
     if (domain.IsEmptyValue(domain.Values()[cell])) values[cell] = kDeleteValue;
@@ -45,14 +32,27 @@ void EmptyOutside(const CTvn2DOrthoRotatedGridData& domain, std::vector<float>& 
 
 }  // namespace
 
-bool ModelLayers::Make(const CSatZoneKvf& zone, const CTvn2DOrthoRotatedGridData& domain, WorkLog& log) {
+std::string ElevationsOn(const CTvn2DOrthoRotatedGridData& domain, const CData2DKvf& quantity,
+                         const std::vector<float>& ground, std::vector<float>& elevations) {
+  CTvn2DOrthoRotatedGridData grid;
+  if (const FileResult made = MakeQuantity(quantity, domain.Geometry())(grid); !made.Ok()) return made.error;
+  if (std::string problem = PutOnModel(grid, domain.Geometry(), false, elevations); !problem.empty()) return problem;
+  if (quantity.HasRelativeToGround() && quantity.RelativeToGround != 0)
+    for (std::size_t cell = 0; cell < elevations.size(); ++cell)
+      if (elevations[cell] != kDeleteValue)
+        elevations[cell] = ground[cell] == kDeleteValue ? kDeleteValue : ground[cell] + elevations[cell];
+  EmptyOutside(domain, elevations);
+  return {};
+}
+
+bool ModelLayers::Make(const CSatZoneKvf& zone, const CTvn2DOrthoRotatedGridData& domain, WorkLog& log,
+                       ThinCells thin) {
   *this = {};
   const std::vector<GroundBody> layers = ComputationalLayersOf(zone), geology = GeologicalLayersOf(zone);
   const auto* topography = zone.Important(kTopography);
   if (layers.empty() || !topography) return true;
   const auto take = [&](const CData2DKvf& quantity, std::vector<float>& levels) {
-    const std::string problem = LevelsOn(domain, quantity, ground_, levels);
-    if (problem.empty()) EmptyOutside(domain, levels);
+    const std::string problem = ElevationsOn(domain, quantity, ground_, levels);
     if (!problem.empty()) log.Error(PathOf(quantity), problem);
     return problem.empty();
   };
@@ -71,16 +71,21 @@ bool ModelLayers::Make(const CSatZoneKvf& zone, const CTvn2DOrthoRotatedGridData
       if (levels[cell] == kDeleteValue || above[cell] == kDeleteValue) continue;
       const float lowest = above[cell] - zone.MimimumLayerThickness;
       if (levels[cell] <= lowest) continue;
-      levels[cell] = lowest;
+      levels[cell] = thin == ThinCells::EndLower ? lowest : above[cell];
       ++corrected;
     }
     bottoms_.push_back(std::move(levels));
   }
   if (corrected > 0)
     log.Warning(PathOf(zone) + ":MimimumLayerThickness",
-                fmt::format("{} cells of computational layers were thinner than {} m and end lower now", corrected,
-                            zone.MimimumLayerThickness));
+                fmt::format("{} cells of computational layers were thinner than {} m and {} now", corrected,
+                            zone.MimimumLayerThickness, thin == ThinCells::EndLower ? "end lower" : "are passed over"));
   return true;
+}
+
+double ModelLayers::Thickness(int layer, std::size_t cell) const {
+  const float top = Tops(layer)[cell], bottom = Bottoms(layer)[cell];
+  return top == kDeleteValue || bottom == kDeleteValue ? 0 : static_cast<double>(top - bottom);
 }
 
 FileResult ModelLayers::Write(const std::string& path, const CTvn2DOrthoRotatedGridData& domain) const {
@@ -128,53 +133,77 @@ std::string boundary_code::NameOf(int code) {
 
 namespace {
 
-/// The outer boundary of a layer as it is painted. A domain that cannot be traced has none; the setup says so.
-void TakeOuterBoundary(const CGeoDataBoundCondListKvf& boundary, std::vector<float>& codes) {
+/// The boundary as `paint` shows it, on the cells of the domain. A domain that cannot be traced has none; the setup
+/// says so.
+template <class Paint>
+std::vector<float> PaintedBoundary(const CGeoDataBoundCondListKvf& boundary, std::size_t cells, const Paint& paint) {
   const auto trace = boundary.Trace();
-  if (boundary.GetItemCount() == 0 || !trace) return;
+  if (boundary.GetItemCount() == 0 || !trace) return {};
   trace->Run();
   const auto* traced = boundary.GetCatchmentData();
-  if (!traced || traced->Values().size() != codes.size()) return;
+  if (!traced || traced->Values().size() != cells) return {};
   CGeoDataBoundCondCatchmentData painted = *traced;
-  painted.PaintBoundaryTypes(boundary.Segments());
-  for (std::size_t cell = 0; cell < codes.size(); ++cell)
-    if (painted.Values()[cell] >= 0) codes[cell] = static_cast<float>(boundary_code::kOuter) + painted.Values()[cell];
-}
-
-/// "" or why the zones cannot be had.
-std::string TakeInternalBoundary(const CSZVerDiscrInternalBoundaryKvf& boundary,
-                                 const CTvn2DOrthoRotatedGridData& domain, std::vector<float>& codes) {
-  const GridSource source = boundary.CurrentSource();
-  if (!boundary.IsInForce() || source.file.empty()) return {};
-  AreaCodes areas;
-  if (const FileResult read = ReadAreaCodes(source, {}, areas); !read.Ok()) return read.error;
-  std::map<std::string, int> typeOfId;
-  for (const CFMSEKvfGroupBase* item : ZoneItems(boundary))
-    if (const auto* zone = dynamic_cast<const CSZVerDiscrInternalBoundaryPropKvf*>(item))
-      typeOfId[areas.arePolygons ? zone->GetStationId() : std::to_string(zone->StationCode())] = zone->BoundaryType;
-  const std::vector<std::optional<float>> found = ValuesIn(domain, areas.grid);
-  std::size_t inDomain = 0;
-  for (std::size_t cell = 0; cell < codes.size(); ++cell) {
-    if (domain.IsEmptyValue(domain.Values()[cell])) continue;
-    const std::optional<float>& code = found[inDomain++];
-    if (!code) continue;
-    const auto type = typeOfId.find(areas.IdOf(*code));
-    if (type != typeOfId.end() && type->second != CSZVerDiscrInternalBoundaryPropKvf::kNone)
-      codes[cell] = static_cast<float>(boundary_code::kInner + type->second);
-  }
-  return {};
+  paint(painted, boundary.Segments());
+  return painted.Values();
 }
 
 }  // namespace
+
+std::vector<int> SegmentsOnCells(const CGeoDataBoundCondListKvf& boundary, const CTvn2DOrthoRotatedGridData& domain) {
+  std::vector<int> segments(domain.Geometry().CellCount(), kNoSegment);
+  const std::vector<float> painted = PaintedBoundary(
+      boundary, segments.size(), [](auto& grid, const auto& items) { grid.PaintBoundaryNumbers(items); });
+  // They are painted from 1.
+  for (std::size_t cell = 0; cell < painted.size(); ++cell)
+    if (painted[cell] >= 1) segments[cell] = static_cast<int>(std::lround(painted[cell])) - 1;
+  return segments;
+}
+
+FileResult ZonesOnCells(const CSZVerDiscrInternalBoundaryKvf& boundary, const CTvn2DOrthoRotatedGridData& domain,
+                        BoundaryZones& zones) {
+  zones.zoneOfCell.assign(domain.Geometry().CellCount(), BoundaryZones::kNone);
+  zones.zones.clear();
+  const GridSource source = boundary.CurrentSource();
+  if (!boundary.IsInForce() || source.file.empty()) return {};
+  AreaCodes areas;
+  if (FileResult read = ReadAreaCodes(source, {}, areas); !read.Ok()) return read;
+  std::map<std::string, int> placeOfId;
+  for (const CFMSEKvfGroupBase* item : ZoneItems(boundary))
+    if (const auto* zone = dynamic_cast<const CSZVerDiscrInternalBoundaryPropKvf*>(item)) {
+      placeOfId[areas.arePolygons ? zone->GetStationId() : std::to_string(zone->StationCode())] =
+          static_cast<int>(zones.zones.size());
+      zones.zones.push_back(zone);
+    }
+  const std::vector<std::optional<float>> found = ValuesIn(domain, areas.grid);
+  std::size_t inDomain = 0;
+  for (std::size_t cell = 0; cell < zones.zoneOfCell.size(); ++cell) {
+    if (domain.IsEmptyValue(domain.Values()[cell])) continue;
+    const std::optional<float>& code = found[inDomain++];
+    const auto place = code ? placeOfId.find(areas.IdOf(*code)) : placeOfId.end();
+    if (place != placeOfId.end()) zones.zoneOfCell[cell] = place->second;
+  }
+  return {};
+}
 
 FileResult BoundaryCodes(const CSZVerDiscrLayerKvf& layer, const CTvn2DOrthoRotatedGridData& domain,
                          CTvn2DOrthoRotatedGridData& codes) {
   std::vector<float> values = domain.Values();
   for (float& value : values) value = domain.IsEmptyValue(value) ? kDeleteValue : std::floor(value + 0.5F);
-  if (layer.OuterBoundary().IsDataUsedInSetup()) TakeOuterBoundary(layer.OuterBoundary(), values);
+  if (layer.OuterBoundary().IsDataUsedInSetup()) {
+    const std::vector<float> painted = PaintedBoundary(
+        layer.OuterBoundary(), values.size(), [](auto& grid, const auto& items) { grid.PaintBoundaryTypes(items); });
+    for (std::size_t cell = 0; cell < painted.size(); ++cell)
+      if (painted[cell] >= 0) values[cell] = static_cast<float>(boundary_code::kOuter) + painted[cell];
+  }
   auto* inner = layer.Child<CSZVerDiscrInternalBoundaryKvf>();
+  BoundaryZones zones;
   if (inner && inner->IsDataUsedInSetup())
-    if (std::string problem = TakeInternalBoundary(*inner, domain, values); !problem.empty()) return {problem, {}};
+    if (FileResult read = ZonesOnCells(*inner, domain, zones); !read.Ok()) return read;
+  for (std::size_t cell = 0; cell < zones.zoneOfCell.size(); ++cell) {
+    const auto* zone = zones.At(cell);
+    if (zone && zone->BoundaryType != CSZVerDiscrInternalBoundaryPropKvf::kNone)
+      values[cell] = static_cast<float>(boundary_code::kInner + zone->BoundaryType);
+  }
   return {codes.TakeValues(domain.Geometry(), std::move(values), kDeleteValue, kDimensionlessUnit, quantity::kCode),
           {}};
 }

@@ -1,0 +1,217 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "modflow6/modflow6_export.h"
+
+#include <filesystem>
+#include <functional>
+
+#include <gmock/gmock.h>
+
+#include "platform/files.h"
+#include "simspec/basic_parameters.h"
+#include "simspec/model_components.h"
+#include "simspec/periods.h"
+#include "simspec/stress_periods.h"
+#include "spatial/data2d.h"
+#include "spatial/domain.h"
+#include "spatial/series_totals.h"
+#include "subsurface/geology.h"
+#include "subsurface/saturated_zone.h"
+#include "subsurface/wells.h"
+#include "tests/modflow6/model_reader.h"
+#include "tests/simspec/test_setup.h"
+#include "tests/support/temp_folder.h"
+
+namespace tervane::modflow6_export_test {
+namespace {
+
+using modflow6::ExportModflow6;
+using modflow6::ExportReport;
+using modflow6::Fate;
+using modflow6::Modflow6Options;
+using test::ModelReader;
+using testing::DoubleNear;
+using testing::HasSubstr;
+
+/// Cancels when it was asked that often.
+class TestLog : public WorkLog {
+ public:
+  explicit TestLog(int asksBeforeCancel = -1) : left_(asksBeforeCancel) {}
+  void Progress(int, std::string_view) override {}
+  void Error(std::string_view, std::string_view) override {}
+  void Warning(std::string_view, std::string_view) override {}
+  bool IsCancelled() const override {
+    if (left_ > 0) --left_;
+    return left_ == 0;
+  }
+
+ private:
+  mutable int left_;
+};
+
+/// The example with a Modflow engine, where it stands.
+class Rhone {
+ public:
+  Rhone() {
+    EXPECT_TRUE(setup.OnOpenDocument(TERVANE_SOURCE_DIR "/examples/rhone/rhone_modflow.tvd")) << setup.Error();
+  }
+
+  FileResult Export(const std::string& name, const Modflow6Options& options = {}, TestLog log = TestLog()) {
+    report = {};
+    return ExportModflow6(setup.Root(), "Rhone, Modflow", folder.File(name), options, log, report);
+  }
+  ModelReader Exported(const std::string& name, const Modflow6Options& options = {}) {
+    const FileResult result = Export(name, options);
+    EXPECT_EQ(result.error, "");
+    return ModelReader(folder.File(name));
+  }
+  bool Tells(Fate fate, const std::string& place, const std::string& text) const {
+    return std::ranges::any_of(report.Entries(), [&](const modflow6::ExportEntry& entry) {
+      return entry.fate == fate && entry.place == place && entry.text.find(text) != std::string::npos;
+    });
+  }
+
+  CFlowModelDoc setup;
+  test::TempFolder folder;
+  ExportReport report;
+};
+
+TEST(Modflow6Export, TheRhoneIsWhatItsSetupSays) {
+  Rhone rhone;
+  const ModelReader model = rhone.Exported("model");
+  EXPECT_EQ(model.layers, 3);
+  EXPECT_EQ(model.rows, 97);
+  EXPECT_EQ(model.columns, 142);
+  EXPECT_EQ(model.periods, (std::vector<ModelReader::Row>{
+                               {"366", "1", "1.1"}, {"365", "12", "1.1"}, {"365", "12", "1.1"}, {"364", "12", "1.1"}}));
+  // The first period is steady, the second begins what is not.
+  std::string storage;
+  for (const test::InputBlock& block : model.files.at("STO6"))
+    if (block.name.starts_with("PERIOD")) storage += block.name + " " + block.lines.at(0).at(0) + ", ";
+  EXPECT_EQ(storage, "PERIOD 1 STEADY-STATE, PERIOD 2 TRANSIENT, ");
+
+  // A cell of the plain, at Saxon: row 53 from the north. The clay lies in the alluvium, 7 of 80 m.
+  const int row = 53, column = 46;
+  EXPECT_NEAR(model.At("TOP/1", row, column) - model.At("BOTM/1", row, column), 80, 1e-3);
+  EXPECT_NEAR(model.At("K/1", row, column), (73 * 1e-3 + 7 * 1e-8) / 80 * 86400, 1e-3);
+  EXPECT_NEAR(model.At("K33/1", row, column), 80 / (73 / 1e-4 + 7 / 1e-9) * 86400, 1e-7);
+  EXPECT_NEAR(model.At("SY/1", row, column), (73 * 0.2 + 7 * 0.03) / 80, 1e-5);
+  EXPECT_NEAR(model.At("K/2", row, column), 1e-5 * 86400, 1e-5);
+  EXPECT_NEAR(model.At("TOP/1", row, column) - model.At("STRT/1", row, column), 3, 1e-3);
+
+  // What rains and what is pumped: the means of the series over the periods.
+  double drains = 0;
+  for (const auto& entry : model.stresses.at("drn").at(1)) drains += std::stod(entry[4]);
+  EXPECT_NEAR(drains, static_cast<double>(model.stresses.at("drn").at(1).size()) * 1e-6 * 1e6 * 86400, 1);
+  const TimeSpan second{CYbDateTime(2013, 1, 1).SecondsSinceEpoch(), CYbDateTime(2014, 1, 1).SecondsSinceEpoch()};
+  const SeriesFacts pumping = SumSeries(TERVANE_SOURCE_DIR "/examples/rhone/pumping.nds0", 2, {second}, {}, {});
+  double sion = 0;
+  for (const auto& entry : model.stresses.at("wel").at(2))
+    if (entry[4] == "Sion Sud") sion += std::stod(entry[3]);
+  EXPECT_THAT(sion, DoubleNear(-pumping.sums[0].integral / static_cast<double>(second.Seconds()) * 86400, 2500));
+  EXPECT_LT(sion, -1000);
+  double rain = 0;
+  int cells = 0;
+  for (int r = 1; r <= model.rows; ++r)
+    for (int c = 1; c <= model.columns; ++c)
+      if (model.IsActive(1, r, c)) rain += model.At("RECHARGE@2/1", r, c), ++cells;
+  EXPECT_NEAR(rain / cells * 365, 0.25 * 1.0, 0.2);  // A quarter of some 1000 mm a year.
+  EXPECT_EQ(model.stresses.at("chd").at(1).size(), 6U);
+
+  EXPECT_TRUE(rhone.Tells(Fate::Carried, "SaturatedZone/GeoLayersSZ/Layer_1/HorHydrCon", "K of NPF"));
+  EXPECT_TRUE(rhone.Tells(Fate::Changed, "SaturatedZone/GeoLayersSZ/Layer_1/HorizontalAnisotropyRatio", "0"));
+  EXPECT_TRUE(rhone.Tells(Fate::LeftOut, "SimSpec/CompControlParaModPackage:HDRY", "1e30"));
+  EXPECT_THAT(test::ReadFile(rhone.folder.File("model/export-report.txt")), HasSubstr("left out:"));
+}
+
+TEST(Modflow6Export, BinaryArraysHoldWhatTextDoes) {
+  Rhone rhone;
+  const ModelReader text = rhone.Exported("text");
+  const ModelReader binary = rhone.Exported("binary", {.arrays = Modflow6Options::Arrays::Binary});
+  ASSERT_EQ(text.arrays.size(), binary.arrays.size());
+  // Values have the precision of their files.
+  for (const auto& [name, array] : text.arrays) {
+    const std::vector<float> singles(array.values.begin(), array.values.end());
+    const std::vector<double>& stored = binary.arrays.at(name).values;
+    EXPECT_EQ(singles, std::vector<float>(stored.begin(), stored.end())) << name;
+  }
+}
+
+TEST(Modflow6Export, EnginesAndOptionsDecideWhatIsWritten) {
+  Rhone rhone;
+  auto& basics = *rhone.setup.Root().Important(kBasicParameters);
+  auto& zone = *rhone.setup.Root().Important(kSaturatedZone);
+  auto& periods = *rhone.setup.Root().Important(kStressPeriods);
+
+  basics.ModelType = kEngineModflowSurfact;
+  periods.GetItem(2)->DELT = 2;
+  periods.GetItem(2)->TSDIV = 1;
+  const ModelReader adaptive = rhone.Exported("adaptive");
+  EXPECT_TRUE(adaptive.Options("TDIS").contains("ATS6"));
+  EXPECT_TRUE(FileExists(rhone.folder.File("adaptive/rhone__modflow.ats")));
+  EXPECT_THAT(test::ReadFile(rhone.folder.File("adaptive/rhone__modflow.ats")), HasSubstr("  2 2 1e-05 1000 1.1 0\n"));
+  EXPECT_TRUE(rhone.Tells(Fate::Changed, "SimSpec/STRESSPERIODS", "nearest"));
+
+  basics.ModelType = kEngineModflow96;
+  periods.MfSteadyState = 1;
+  zone.Wells = zone.Drainage = 0;
+  zone.MimimumLayerThickness = 100;
+  const ModelReader thick = rhone.Exported("thick");
+  EXPECT_FALSE(thick.files.contains("STO6"));
+  EXPECT_FALSE(thick.files.contains("WEL6"));
+  EXPECT_FALSE(thick.files.contains("DRN6"));
+  EXPECT_NEAR(thick.At("TOP/1", 53, 46) - thick.At("BOTM/1", 53, 46), 100, 1e-3);
+  EXPECT_TRUE(rhone.Tells(Fate::Changed, "SaturatedZone:MimimumLayerThickness", "end lower"));
+  const ModelReader thin = rhone.Exported("thin", {.thinCells = ModelLayers::ThinCells::Vanish});
+  EXPECT_EQ(thin.At("IDOMAIN/1", 53, 46), -1);
+  EXPECT_TRUE(thin.IsActive(3, 53, 46));
+}
+
+TEST(Modflow6Export, WhatIsNoModelIsRefusedAndTheFolderStaysAsItWas) {
+  struct Case {
+    std::function<void(CYbSEKvfGlobalBase&)> change;
+    const char* error;
+  };
+  const Case cases[] = {
+      {[](auto& root) { root.Important(kBasicParameters)->ModelType = kEngineTervane; }, "choose a Modflow engine"},
+      {[](auto& root) { root.Important(kModflowComponents)->Subsurface = 0; }, "no flow below ground"},
+      {[](auto& root) { root.Important(kSaturatedZone)->TypeOfVerDiscr = CSatZoneKvf::kUniform; },
+       "define them by geological layers"},
+      {[](auto& root) { root.Important(kDomain)->ShapeFile().File = FileName("gone.shp", "/nowhere"); }, "gone.shp"},
+      {[](auto& root) { root.Important(kStressPeriods)->SetItemCount(0, 1); }, "there are no stress periods"},
+      {[](auto& root) {
+         auto& periods = *root.Important(kStressPeriods);
+         periods.GetItem(1)->SetEndDate(CYbDateTime(2015, 1, 1));
+       },
+       "dates must increase"},
+      {[](auto& root) { root.Important(kSimulationPeriod)->SIMEND = CYbDateTime(2029, 1, 1); },
+       "covers 7 % of stress period 4"},
+      {[](auto& root) { root.Important(kWells)->Filename = FileName("gone.WEL", "/nowhere"); }, "gone.WEL"},
+  };
+  for (const Case& c : cases) {
+    Rhone rhone;
+    c.change(rhone.setup.Root());
+    EXPECT_THAT(rhone.Export("model").error, HasSubstr(c.error));
+    EXPECT_TRUE(std::filesystem::is_empty(rhone.folder.Path())) << c.error;
+  }
+
+  Rhone rhone;
+  rhone.folder.Write("file", "");
+  EXPECT_THAT(rhone.Export("file").error, HasSubstr("name a folder"));
+  rhone.folder.Write("other/mfsim.nam", "of another model");
+  EXPECT_THAT(rhone.Export("other").error, HasSubstr("holds a model"));
+  EXPECT_EQ(test::ReadFile(rhone.folder.File("other/mfsim.nam")), "of another model");
+  rhone.folder.Write("other/notes.txt", "of the user");
+  EXPECT_EQ(rhone.Export("other", {.force = true}).error, "");
+  EXPECT_EQ(ModelReader(rhone.folder.File("other")).layers, 3);
+  EXPECT_EQ(test::ReadFile(rhone.folder.File("other/notes.txt")), "of the user");
+  // Cancelled early, and while arrays are written.
+  for (const int asks : {1, 5, 300, 1000}) {
+    EXPECT_EQ(rhone.Export("cancelled", {}, TestLog(asks)).error, "cancelled") << asks;
+    EXPECT_FALSE(std::filesystem::exists(rhone.folder.File("cancelled")));
+    EXPECT_FALSE(std::filesystem::exists(rhone.folder.File("cancelled.writing")));
+  }
+}
+
+}  // namespace
+}  // namespace tervane::modflow6_export_test
