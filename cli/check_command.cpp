@@ -1,6 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <algorithm>
+#include <unordered_map>
 #include <vector>
 
 #include <fmt/format.h>
@@ -37,7 +38,30 @@ std::string_view KindName(KvfUnread::Kind kind) {
   return {};
 }
 
-void WriteJson(const std::vector<SetupFinding>& findings, std::ostream& out) {
+/// The nodes below by their serials.
+void CollectNodes(const CYbSEKvfBase& node, std::unordered_map<std::uint64_t, const CYbSEKvfBase*>& nodes) {
+  nodes.emplace(node.Serial(), &node);
+  for (const CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+    CollectNodes(*child, nodes);
+}
+
+std::string MendsJson(const CYbSEKvfBase& node, const SetupFinding& finding) {
+  std::vector<std::string> mends;
+  for (const Mend& mend : MendsOf(node, finding))
+    mends.push_back(JsonObject({{"text", JsonQuoted(mend.text)},
+                                {"path", JsonQuoted(fmt::format("{}:{}", finding.path, mend.key))},
+                                {"value", JsonQuoted(mend.value)}}));
+  return mends.empty() ? std::string() : JsonArray(mends);
+}
+
+void WriteJson(const CYbSEDocument& document, const std::vector<SetupFinding>& findings, std::ostream& out) {
+  std::unordered_map<std::uint64_t, const CYbSEKvfBase*> nodes;
+  if (!findings.empty()) CollectNodes(document.Root(), nodes);
+  const auto mends = [&](const SetupFinding& finding) {
+    const auto node = nodes.find(finding.serial);
+    return node == nodes.end() ? std::string() : MendsJson(*node->second, finding);
+  };
+
   const auto optional = [](const std::string& text) { return text.empty() ? std::string() : JsonQuoted(text); };
   std::vector<std::string> found, notRead;
   for (const SetupFinding& finding : findings) {
@@ -52,7 +76,8 @@ void WriteJson(const std::vector<SetupFinding>& findings, std::ostream& out) {
                                   {"text", JsonQuoted(finding.text)},
                                   {"key", optional(finding.key)},
                                   {"detail", optional(finding.detail)},
-                                  {"line", finding.line > 0 ? std::to_string(finding.line) : std::string()}}));
+                                  {"line", finding.line > 0 ? std::to_string(finding.line) : std::string()},
+                                  {"mends", mends(finding)}}));
   }
   fmt::print(out, "{}\n", JsonObject({{"findings", JsonArray(found)}, {"unread", JsonArray(notRead)}}));
 }
@@ -87,7 +112,7 @@ int CheckCommand(const std::string& file, bool json, bool each, Streams streams)
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   const std::vector<SetupFinding> findings = FindingsOf(document);
   if (json)
-    WriteJson(findings, streams.out);
+    WriteJson(document, findings, streams.out);
   else
     WriteText(file, findings, each, streams.out);
   return std::ranges::any_of(findings, NeedsAttention) ? kFindings : kDone;

@@ -137,6 +137,14 @@ void AddEngineMessages(const CYbSEDocument& document, const std::vector<EngineMe
   }
 }
 
+std::vector<Mend> MendsOf(const CYbSEKvfBase& node, const SetupFinding& finding) {
+  const auto* offers = dynamic_cast<const OffersMends*>(&node);
+  if (!offers || finding.isPast || finding.key.empty()) return {};
+  for (const Finding& own : node.Findings())
+    if (own.key == finding.key && own.text == finding.text && own.detail == finding.detail) return offers->MendsOf(own);
+  return {};
+}
+
 std::string FindingGroup::Text() const {
   std::string text = First().text;
   if (!First().detail.empty()) text += fmt::format(" ({})", First().detail);

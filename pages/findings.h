@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "core/document.h"
+#include "core/mends.h"
 #include "execution/engine_line.h"
 
 namespace tervane {
@@ -44,6 +45,9 @@ SetupFinding FindingOf(const CYbSEDocument& document, const EngineMessage& messa
 /// all that may hold no more.
 void AddEngineMessages(const CYbSEDocument& document, const std::vector<EngineMessage>& messages,
                        const std::string& whyPast, std::vector<SetupFinding>& findings);
+
+/// What the node of a finding offers to mend it. Most offer nothing.
+std::vector<Mend> MendsOf(const CYbSEKvfBase& node, const SetupFinding& finding);
 
 /// Findings of one cause: the same is said of the same key at several like places.
 struct FindingGroup {

@@ -176,13 +176,17 @@ void FindingsView::Step(int by) {
   Choose(next);
 }
 
-void FindingsView::Choose(QTreeWidgetItem* item) {
-  if (!item) return;
+const SetupFinding* FindingsView::FindingOfLine(QTreeWidgetItem* item) const {
+  if (!item) return nullptr;
   const int group = indexOfTopLevelItem(item->parent() ? item->parent() : item);
   const int place = item->parent() ? item->parent()->indexOfChild(item) : 0;
-  if (group < 0) return;
+  if (group < 0) return nullptr;
+  return &groups_[static_cast<std::size_t>(group)].findings[static_cast<std::size_t>(place)];
+}
+
+void FindingsView::Choose(QTreeWidgetItem* item) {
   // A copy: the list may be another one before its place is shown.
-  emit FindingChosen(SetupFinding(groups_[static_cast<std::size_t>(group)].findings[static_cast<std::size_t>(place)]));
+  if (const SetupFinding* finding = FindingOfLine(item)) emit FindingChosen(SetupFinding(*finding));
 }
 
 void FindingsView::paintEvent(QPaintEvent* event) {
@@ -195,15 +199,33 @@ void FindingsView::paintEvent(QPaintEvent* event) {
                    tr("No findings."));
 }
 
-void FindingsView::contextMenuEvent(QContextMenuEvent* event) {
-  QTreeWidgetItem* item = itemAt(event->pos());
-  if (!item) return;
-  QMenu menu;
+void FindingsView::FillMenu(QMenu& menu, QTreeWidgetItem* item) {
   menu.addAction(tr("&Go to Place"), this, [this, item] { Choose(item); });
   menu.addAction(tr("&Copy"), this, [item] {
     QApplication::clipboard()->setText(
         QString("%1: %2: %3").arg(item->text(kKindColumn), item->text(kPlaceColumn), item->text(kTextColumn)));
   });
+  const SetupFinding* finding = FindingOfLine(item);
+  const bool isGroup = !item->parent() && !groups_[static_cast<std::size_t>(indexOfTopLevelItem(item))].IsOne();
+  if (!finding || !finding->serial || isGroup) return;
+  Nodes nodes{{finding->serial, nullptr}};
+  CollectNodes(document_.Root(), nodes);
+  const CYbSEKvfBase* node = nodes.begin()->second;
+  const std::vector<Mend> mends = node ? MendsOf(*node, *finding) : std::vector<Mend>();
+  if (mends.empty()) return;
+  menu.addSeparator();
+  constexpr std::size_t kFew = 6;
+  QMenu& offered = mends.size() > kFew ? *menu.addMenu(tr("&Mend")) : menu;
+  for (const Mend& mend : mends)
+    offered.addAction(ToQt(mend.text).replace("&", "&&"), this,
+                      [this, serial = finding->serial, mend] { emit MendChosen(serial, mend); });
+}
+
+void FindingsView::contextMenuEvent(QContextMenuEvent* event) {
+  QTreeWidgetItem* item = itemAt(event->pos());
+  if (!item) return;
+  QMenu menu;
+  FillMenu(menu, item);
   menu.exec(event->globalPos());
 }
 

@@ -9,6 +9,8 @@
 #include "pages/findings.h"
 #include "pages/place_names.h"
 
+class QMenu;
+
 namespace tervane {
 
 /// All that is wrong in a setup, as a list; choosing one leads to its place. Findings of one cause are one line with
@@ -24,9 +26,13 @@ class FindingsView : public QTreeWidget {
   int Count() const;
   /// Chooses the next or the previous line.
   void Step(int by);
+  /// The commands of a line, with what mends its finding.
+  void FillMenu(QMenu& menu, QTreeWidgetItem* item);
 
  signals:
   void FindingChosen(const SetupFinding& finding);
+  /// What the node of that serial offers is to be done.
+  void MendChosen(quint64 serial, const Mend& mend);
 
  protected:
   void paintEvent(QPaintEvent* event) override;
@@ -36,6 +42,8 @@ class FindingsView : public QTreeWidget {
   using Nodes = std::unordered_map<std::uint64_t, CYbSEKvfBase*>;
 
   void Choose(QTreeWidgetItem* item);
+  /// What a line stands for; of a group the first. Null for no line.
+  const SetupFinding* FindingOfLine(QTreeWidgetItem* item) const;
   QTreeWidgetItem* NewLine(const SetupFinding& finding, const QString& place, const QString& text) const;
   /// Makes the lines of a group when it is first opened.
   void Fill(QTreeWidgetItem* item);

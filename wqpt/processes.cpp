@@ -80,6 +80,17 @@ int CProcessesWQ_DecayItemKvf::ValidateData() {
   return 1;
 }
 
+std::vector<Mend> CProcessesWQ_DecayItemKvf::MendsOf(const Finding& finding) const {
+  const auto* species = Important(kSpecies);
+  if (!species || finding.key != "Species") return {};
+  return MendsByNames(finding.key, species->NamesWithoutType(CSpeciesItemKvf::kFixed));
+}
+
+void CProcessesWQ_DecayItemKvf::TakeMend(const Mend& mend) {
+  Species = mend.value;
+  if (auto* list = dynamic_cast<CProcessesWQ_DecayListKvf*>(GetParent())) list->Notify(0, nullptr);
+}
+
 CProcessesWQ_DecayListKvf::CProcessesWQ_DecayListKvf(CYbSEKvfBase* parent)
     : CTvnMasterList("CProcessesWQ_DecayListKvf", "Decay_Processes", "Decay_", parent) {
   if (auto* species = Important(kSpecies)) species->AddListener(this);
@@ -150,6 +161,18 @@ int CProcessesWQ_SorptionItemKvf::ValidateData() {
     if (species && !species->FindByName(*name))
       AddWarning("The process names a species that the setup does not have", key, *name);
   return 1;
+}
+
+std::vector<Mend> CProcessesWQ_SorptionItemKvf::MendsOf(const Finding& finding) const {
+  const auto* species = Important(kSpecies);
+  if (!species) return {};
+  if (finding.key == "Species") return MendsByNames(finding.key, species->NamesOfType(CSpeciesItemKvf::kDissolved));
+  if (finding.key == "SorbedSpecies") return MendsByNames(finding.key, species->NamesOfType(CSpeciesItemKvf::kSorbed));
+  return {};
+}
+
+void CProcessesWQ_SorptionItemKvf::TakeMend(const Mend& mend) {
+  (mend.key == "Species" ? Species : SorbedSpecies) = mend.value;
 }
 
 CProcessesWQ_SorptionListKvf::CProcessesWQ_SorptionListKvf(CYbSEKvfBase* parent)

@@ -13,7 +13,7 @@ namespace tervane {
 
 /// A process of either list: a name, and a species that it works on.
 template <class ItemBase>
-class ProcessItemKvf : public CYbSEKvfGroupBase, public ItemBase {
+class ProcessItemKvf : public CYbSEKvfGroupBase, public ItemBase, public OffersMends {
  public:
   using CYbSEKvfGroupBase::CYbSEKvfGroupBase;
 
@@ -47,6 +47,9 @@ class CProcessesWQ_DecayItemKvf : public ProcessItemKvf<CDencyItemBase> {
 
   void ReadData(KvfNode* section) override;
   int ValidateData() override;
+  /// The species that may decay, for one that is gone.
+  std::vector<Mend> MendsOf(const Finding& finding) const override;
+  void TakeMend(const Mend& mend) override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
@@ -90,6 +93,9 @@ class CProcessesWQ_SorptionItemKvf : public ProcessItemKvf<CSorptionProcessesIte
 
   void ReadData(KvfNode* section) override;
   int ValidateData() override;
+  /// The dissolved or the sorbed species, for one that is gone.
+  std::vector<Mend> MendsOf(const Finding& finding) const override;
+  void TakeMend(const Mend& mend) override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;

@@ -4,6 +4,8 @@
 
 #include <algorithm>
 
+#include <fmt/format.h>
+
 #include "simspec/conditions.h"
 #include "simspec/pages.h"
 #include "wqpt/pages.h"
@@ -92,6 +94,24 @@ int CSourceWQItemKvf::ValidateData() {
   if (species && !species->FindByName(Species))
     AddWarning("The source names a species that the setup does not have", "Species", Species);
   return 1;
+}
+
+std::vector<Mend> CSourceWQItemKvf::MendsOf(const Finding& finding) const {
+  const auto* species = Important(kSpecies);
+  if (species && finding.key == "Species")
+    return MendsByNames(finding.key, species->NamesWithoutType(CSpeciesItemKvf::kFixed));
+  std::vector<Mend> mends;
+  if (finding.key == "SourceType")
+    for (const SourceType& type : SourceTypes())
+      if (type.location == Location)
+        mends.push_back({fmt::format("Change SourceType to {}", type.text), finding.key, std::to_string(type.code)});
+  return mends;
+}
+
+void CSourceWQItemKvf::TakeMend(const Mend& mend) {
+  if (mend.key == "Species") Species = mend.value;
+  for (const SourceType& type : SourceTypes())
+    if (mend.key == "SourceType" && mend.value == std::to_string(type.code)) SetSourceType(type.code);
 }
 
 void CSourceWQItemKvf::ExchangeKeys(KeyExchange& keys) {

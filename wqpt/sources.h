@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "core/list.h"
+#include "core/mends.h"
 #include "spatial/stations.h"
 #include "wqpt/extent.h"
 
@@ -32,7 +33,7 @@ class CStrengthWQKvf : public C2DStationBasedDataKvf {
 };
 
 /// A source.
-class CSourceWQItemKvf : public CYbSEKvfGroupBase {
+class CSourceWQItemKvf : public CYbSEKvfGroupBase, public OffersMends {
  public:
   explicit CSourceWQItemKvf(CYbSEKvfBase* parent);
 
@@ -56,6 +57,9 @@ class CSourceWQItemKvf : public CYbSEKvfGroupBase {
   void ReadData(KvfNode* section) override;
   /// Warnings alone: a type that is none or of the other location, a species that is gone.
   int ValidateData() override;
+  /// The species that a source may be of, and the types of its location.
+  std::vector<Mend> MendsOf(const Finding& finding) const override;
+  void TakeMend(const Mend& mend) override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;

@@ -4,6 +4,8 @@
 
 #include <set>
 
+#include <fmt/format.h>
+
 #include "platform/item_types.h"
 #include "platform/text.h"
 #include "simspec/conditions.h"
@@ -146,6 +148,12 @@ int CSpeciesListKvf::ValidateData() {
     isValid = 0;
   }
   return isValid;
+}
+
+std::vector<Mend> MendsByNames(const std::string& key, const std::vector<std::string>& names) {
+  std::vector<Mend> mends;
+  for (const std::string& name : names) mends.push_back({fmt::format("Change {} to {}", key, name), key, name});
+  return mends;
 }
 
 CSpeciesItemKvf* SpeciesOf(const CYbSEKvfBase& entry) {

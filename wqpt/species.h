@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "core/dependent_list.h"
+#include "core/mends.h"
 #include "simspec/water_quality_processes.h"
 
 namespace tervane {
@@ -75,6 +76,9 @@ class CSpeciesListKvf : public CTvnMasterList<CSpeciesItemKvf, CSpeciesListBase>
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("NumberOfSpecies", *this); }
 };
 inline constexpr ImportantName<CSpeciesListKvf> kSpecies{"SPECIES_LIST"};
+
+/// A name for that key of a node, of these species, in the place of one that is gone.
+std::vector<Mend> MendsByNames(const std::string& key, const std::vector<std::string>& names);
 
 /// The species that an entry follows; null for any other node, and where the species are gone.
 CSpeciesItemKvf* SpeciesOf(const CYbSEKvfBase& entry);

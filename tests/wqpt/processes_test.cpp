@@ -74,6 +74,37 @@ TEST(Processes, ADecayCountsWhereTheTypeOfItsSpeciesDecays) {
   EXPECT_EQ(setup.At<CProcessesWQKvf>("Processes").Decays().GetItem(2)->Species, "B");
 }
 
+TEST(Processes, ASpeciesThatIsGoneIsReplacedByOneThatIsOffered) {
+  QualitySetup setup(
+      "section SimSpec { section ModelComp { WQ = 1; } } section ModelCompWQ { IncludeProcesses = 1; OL = 1; } section "
+      "Species { NumberOfSpecies = 3; section Species_1 { Name = \"A\"; } section Species_2 { Name = \"B\"; Type = 1; "
+      "} "
+      "section Species_3 { Name = \"C\"; Type = 3; } } section Processes { section Decay_Processes { NumberOfDecay = "
+      "1; "
+      "section Decay_1 { Species = \"gone\"; } } section Sorption_Processes { NumberOfSorption = 1; section Sorption_1 "
+      "{ "
+      "Species = \"A\"; SorbedSpecies = \"gone\"; } } }");
+  setup.Root().Validate();
+  const auto offered = [](CYbSEKvfBase& node) {
+    std::string texts;
+    for (const Mend& mend : dynamic_cast<OffersMends&>(node).MendsOf(node.Findings().front()))
+      texts += mend.text + "; ";
+    return texts;
+  };
+  auto& decay = *setup.At<CProcessesWQKvf>("Processes").Decays().GetItem(1);
+  auto& sorption = *setup.At<CProcessesWQKvf>("Processes").Sorptions().GetItem(1);
+  // What has no phase does not decay.
+  EXPECT_EQ(offered(decay), "Change Species to A; Change Species to B; ");
+  EXPECT_EQ(offered(sorption), "Change SorbedSpecies to B; ");
+  EXPECT_FALSE(setup.IsUsed("Overland/Decay_Processes/Decay_1"));
+  decay.TakeMend(decay.MendsOf(decay.Findings().front()).front());
+  sorption.TakeMend(sorption.MendsOf(sorption.Findings().front()).front());
+  setup.Root().Validate();
+  EXPECT_TRUE(decay.Findings().empty() && sorption.Findings().empty());
+  EXPECT_TRUE(setup.IsUsed("Overland/Decay_Processes/Decay_1")) << "what follows the process is told";
+  EXPECT_TRUE(decay.MendsOf({Severity::Error, "", "Name", ""}).empty());
+}
+
 TEST(Processes, WhatIsRefusedFirst) {
   struct Case {
     const char* keys;
