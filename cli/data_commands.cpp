@@ -11,6 +11,7 @@
 #include "cli/library_info.h"
 #include "cli/offers.h"
 #include "cli/river_commands.h"
+#include "cli/template_info.h"
 #include "data/datafile.h"
 #include "data/datafile_request.h"
 #include "geometry/shapes.h"
@@ -227,6 +228,7 @@ bool HasExtension(const std::string& path, std::initializer_list<std::string_vie
 
 int DataInfoCommand(const std::string& path, bool json, Streams streams) {
   if (const LibraryKind* kind = LibraryKindOf(path)) return PrintLibrary(*kind, path, json, streams);
+  if (HasExtension(path, {".kinetra"})) return PrintTemplate(path, json, streams);
   if (LeadsToRiver(path)) return PrintRiver(path, json, streams);
   if (HasExtension(path, {".shp"})) return PrintShapes(path, json, streams);
   if (HasExtension(path, {".txt", ".xyz"})) return PrintPoints(path, json, streams);
@@ -300,9 +302,10 @@ void OfferDataCommands(CommandOffers& offers) {
     bool json = false;
   };
   auto options = std::make_shared<Options>();
-  const Command data = offers.Family(
-      "data",
-      "Look into data files (.nds0 to .nds3, netCDF), rasters (GeoTIFF, ...), libraries (.etv) and river networks");
+  const Command data = offers.Family("data",
+                                     "Look into data files (.nds0 to .nds3, netCDF), rasters (GeoTIFF, ...), libraries "
+                                     "(.etv), process templates and river "
+                                     "networks");
   Command info = offers.Offer(
       "info", "Tell items, times and place",
       [offers, options] { return DataInfoCommand(options->file, options->json, offers.Output()); }, &data);

@@ -116,7 +116,10 @@ class ArrangedRows : public RowsOf<Row> {
   int Count() const override { return static_cast<int>(shown_.size()); }
   Row& At(int row) const override { return *shown_[static_cast<std::size_t>(row - 1)]; }
   const void* Identity(int row) const override { return shown_[static_cast<std::size_t>(row - 1)]; }
-  const CYbSEKvfBase* Node(int row) const override { return &At(row); }
+  const CYbSEKvfBase* Node(int row) const override {
+    if constexpr (std::derived_from<Row, CYbSEKvfBase>) return &At(row);
+    return nullptr;
+  }
   bool CanArrange() const override { return true; }
   bool Refresh() override {
     std::vector<Row*> now = source_();

@@ -33,6 +33,7 @@
 #include "shell/why_dialog.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
+#include "wqpt/kinetra_specification.h"
 
 namespace tervane {
 
@@ -76,6 +77,7 @@ DocumentFrame::DocumentFrame(std::unique_ptr<EditSession> session, const QString
   autosave_.setSingleShot(true);
   connect(&autosave_, &QTimer::timeout, this, &DocumentFrame::RunAutosave);
   connect(&disk_, &QTimer::timeout, this, &DocumentFrame::CheckDisk);
+  connect(&disk_, &QTimer::timeout, this, &DocumentFrame::CheckTemplates);
   disk_.start(kDiskInterval);
   connect(&processed_, &QTimer::timeout, this, &DocumentFrame::CheckProcessedData);
   processed_.start(kProcessedInterval);
@@ -136,6 +138,15 @@ void DocumentFrame::BuildBody() {
   findings_ = new FindingsView(session_->Document());
   connect(findings_, &FindingsView::FindingChosen, this,
           [this](const SetupFinding& finding) { GoTo(finding.serial, finding.key); });
+  connect(findings_, &FindingsView::MendChosen, this, [this](quint64 serial, const Mend& mend) {
+    Commit();
+    CYbSEKvfBase* node = NodeOf(serial);
+    auto* offers = dynamic_cast<OffersMends*>(node);
+    if (!offers) return;
+    offers->TakeMend(mend);
+    node->SetRevalidateAll();
+    session_->UpdateDoc(*node, kTreeRebuilt | kDataChanged, mend.text);
+  });
   bottomTabs_->addTab(findings_, tr("Findings"));
   log_ =
       new LogView(run_->Log(), tr("What happens to this document, and what an engine that runs it says, stands here."));
@@ -498,6 +509,34 @@ void DocumentFrame::CheckDisk() {
                                   : tr("Another program has changed the file on disk."),
                            answers);
   AddBanner(diskBanner_);
+}
+
+void DocumentFrame::CheckTemplates() {
+  auto* templates = session_->Document().Root().Important(kKinetraSpecification);
+  if (!templates) return;
+  std::map<std::string, FileStamp> changed;
+  QStringList names;
+  for (const std::string& path : templates->TemplatesOtherOnDisk()) {
+    changed[path] = StampOf(path);
+    names << QFileInfo(ToQt(path)).fileName();
+  }
+  if (changed == changedTemplates_) return;
+  changedTemplates_ = changed;
+  if (templateBanner_) templateBanner_->deleteLater();
+  // Its own page tells the same.
+  if (page_) page_->Sync();
+  if (changed.empty()) return;
+  templateBanner_ = new Banner(names.size() == 1 ? tr("The template %1 has changed on disk.").arg(names.front())
+                                                 : tr("The templates %1 have changed on disk.").arg(names.join(", ")),
+                               {{tr("Re&fresh"),
+                                 [this, templates] {
+                                   Commit();
+                                   templates->RefreshTemplates();
+                                   templates->SetRevalidateAll();
+                                   session_->UpdateDoc(*templates, kTreeRebuilt | kDataChanged, "Refresh Templates");
+                                 }},
+                                {tr("&Not Now"), [] {}}});
+  AddBanner(templateBanner_);
 }
 
 void DocumentFrame::RunAutosave() {

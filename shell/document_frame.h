@@ -7,6 +7,7 @@
 #include <QTimer>
 #include <QWidget>
 #include <cstdint>
+#include <map>
 #include <memory>
 #include <optional>
 #include <string>
@@ -89,6 +90,8 @@ class DocumentFrame : public QWidget {
 
   void ShowBanner(const QString& text, const std::vector<Banner::Answer>& answers);
   void CheckDisk();
+  /// Looks whether a process template in use has changed on disk, and offers to read it again.
+  void CheckTemplates();
   void Log(const QString& line);
   /// Makes all anew that was computed from colours and sizes.
   void Redraw();
@@ -165,7 +168,8 @@ class DocumentFrame : public QWidget {
   LogView *log_ = nullptr, *riverLog_ = nullptr;
   QWidget* pagePlace_ = nullptr;
   QPointer<PageView> page_;
-  QPointer<Banner> diskBanner_, runBanner_;
+  QPointer<Banner> diskBanner_, runBanner_, templateBanner_;
+  std::map<std::string, FileStamp> changedTemplates_;  ///< As they were when they were offered.
   QPointer<RunPanel> runPanel_;
 
   std::uint64_t current_ = 0;

@@ -31,6 +31,7 @@
 #include "shell/page/table_view.h"
 #include "shell/program.h"
 #include "shell/run/document_run.h"
+#include "shell/template_tab.h"
 #include "shell/welcome_page.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -59,6 +60,7 @@ std::pair<QString, QString> TitleAndPath(const QWidget* tab) {
     return {frame->Title(), ToQt(frame->Session().Path())};
   if (const auto* library = qobject_cast<const LibraryTab*>(tab)) return {library->Title(), ToQt(library->Path())};
   if (const auto* viewer = qobject_cast<const DataViewer*>(tab)) return {viewer->Title(), ToQt(viewer->Path())};
+  if (const auto* shown = qobject_cast<const TemplateTab*>(tab)) return {shown->Title(), ToQt(shown->Path())};
   if (const auto* comparison = qobject_cast<const CompareView*>(tab)) return {comparison->Title(), comparison->Path()};
   return {};
 }

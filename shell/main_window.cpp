@@ -32,6 +32,7 @@
 #include "shell/library_tab.h"
 #include "shell/program.h"
 #include "shell/run/document_run.h"
+#include "shell/template_tab.h"
 #include "shell/welcome_page.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -70,6 +71,7 @@ std::string OpenFilter() {
   std::string filter = "Tervane  Flow Model(*.tvd)|*.tvd|";
   for (const LibraryKind* kind : LibraryKinds())
     filter += std::string(kind->filter.substr(0, kind->filter.find("All Files")));
+  filter += "Kinetra template files (*.kinetra)|*.kinetra|";
   return filter + "All Files (*.*)|*||";
 }
 
@@ -88,7 +90,8 @@ QStringList DroppedFiles(const QMimeData* data) {
   QStringList paths;
   for (const QUrl& url : data->urls()) {
     const QString path = url.toLocalFile();
-    if (url.isLocalFile() && (path.endsWith(".tvd", Qt::CaseInsensitive) || IsDataFile(path) || KindOf(path)))
+    if (url.isLocalFile() && (path.endsWith(".tvd", Qt::CaseInsensitive) || IsDataFile(path) || KindOf(path) ||
+                              IsNamedAsTemplate(FromQt(path))))
       paths << path;
   }
   return paths;
@@ -157,6 +160,15 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
 }
 
 void MainWindow::NewDocument() { AddFrame(EditSession::New(program_.RecoveryFolder())); }
+
+template <class Tab>
+Tab* MainWindow::TabOf(const std::string& path) const {
+  for (int i = 0; i < tabs_->count(); ++i) {
+    auto* tab = qobject_cast<Tab*>(tabs_->widget(i));
+    if (tab && (tab->Path() == path || IsSameFile(tab->Path(), path))) return tab;
+  }
+  return nullptr;
+}
 
 bool MainWindow::OpenDocument(const QString& path) {
   const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
@@ -267,10 +279,9 @@ bool MainWindow::ShowDataFile(const QString& path) {
     return false;
   }
   if (const LibraryKind* kind = KindOf(path)) return OpenLibrary(*kind, path);
-  for (int i = 0; i < tabs_->count(); ++i) {
-    auto* viewer = qobject_cast<DataViewer*>(tabs_->widget(i));
-    if (!viewer || (viewer->Path() != file && !IsSameFile(viewer->Path(), file))) continue;
-    tabs_->setCurrentIndex(i);
+  if (IsNamedAsTemplate(file)) return ShowTemplate(path);
+  if (auto* viewer = TabOf<DataViewer>(file)) {
+    tabs_->setCurrentWidget(viewer);
     viewer->Reload(false);
     return true;
   }
@@ -293,17 +304,15 @@ bool MainWindow::ShowDataFile(const QString& path) {
 }
 
 bool MainWindow::OpenFile(const QString& path) {
-  return IsDataFile(path) || KindOf(path) ? ShowDataFile(path) : OpenDocument(path);
+  return IsDataFile(path) || KindOf(path) || IsNamedAsTemplate(FromQt(path)) ? ShowDataFile(path) : OpenDocument(path);
 }
 
 LibraryTab* MainWindow::ShownLibrary() const { return qobject_cast<LibraryTab*>(tabs_->currentWidget()); }
 
 bool MainWindow::OpenLibrary(const LibraryKind& kind, const QString& path) {
   const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
-  for (int i = 0; i < tabs_->count(); ++i) {
-    auto* library = qobject_cast<LibraryTab*>(tabs_->widget(i));
-    if (!library || (library->Path() != file && !IsSameFile(library->Path(), file))) continue;
-    tabs_->setCurrentIndex(i);
+  if (auto* library = TabOf<LibraryTab>(file)) {
+    tabs_->setCurrentWidget(library);
     library->CheckDisk();
     return true;
   }
@@ -315,6 +324,24 @@ bool MainWindow::OpenLibrary(const LibraryKind& kind, const QString& path) {
   connect(library.get(), &LibraryTab::StateChanged, this, &MainWindow::SyncCommands);
   const QString title = library->Title();
   tabs_->setCurrentIndex(tabs_->addTab(library.release(), title));
+  SyncCommands();
+  return true;
+}
+
+bool MainWindow::ShowTemplate(const QString& path) {
+  const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
+  if (auto* shown = TabOf<TemplateTab>(file)) {
+    tabs_->setCurrentWidget(shown);
+    shown->Reload();
+    return true;
+  }
+  auto made = std::make_unique<TemplateTab>(file, host_);
+  if (!made->Problem().empty()) {
+    host_.ShowMessage(made->Problem(), Host::Icon::Error);
+    return false;
+  }
+  const QString title = made->Title();
+  tabs_->setCurrentIndex(tabs_->addTab(made.release(), title));
   SyncCommands();
   return true;
 }
@@ -466,8 +493,10 @@ void MainWindow::changeEvent(QEvent* event) {
   QMainWindow::changeEvent(event);
   if (event->type() != QEvent::ActivationChange || !isActiveWindow()) return;
   if (Frame()) Frame()->CheckDisk();
+  if (Frame()) Frame()->CheckTemplates();
   if (Viewer()) Viewer()->Reload(false);
   if (ShownLibrary()) ShownLibrary()->CheckDisk();
+  if (auto* shown = qobject_cast<TemplateTab*>(tabs_->currentWidget())) shown->Reload();
 }
 
 void MainWindow::dragEnterEvent(QDragEnterEvent* event) {
@@ -505,6 +534,8 @@ void MainWindow::Restyle() {
       frame->Redraw();
     else if (auto* library = qobject_cast<LibraryTab*>(tabs_->widget(i)))
       library->Redraw();
+    else if (auto* shown = qobject_cast<TemplateTab*>(tabs_->widget(i)))
+      shown->Redraw();
   SyncCommands();
 }
 

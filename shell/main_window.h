@@ -25,6 +25,7 @@ class EditSession;
 class LibraryTab;
 struct LibraryKind;
 class Program;
+class TemplateTab;
 class WelcomePage;
 
 /// The window of the program: documents in tabs, and the commands on them.
@@ -50,6 +51,8 @@ class MainWindow : public QMainWindow {
   bool ShowDataFile(const QString& path);
   /// Opens a library of named entries in a tab of its own, or shows the one in which it is open.
   bool OpenLibrary(const LibraryKind& kind, const QString& path);
+  /// Shows a process template in a tab of its own.
+  bool ShowTemplate(const QString& path);
   /// Nobody is there to answer; see QtHost.
   void SetUnattended() { host_.SetUnattended(); }
   /// One of these, by the file's name.
@@ -104,6 +107,9 @@ class MainWindow : public QMainWindow {
 
   /// The data file that is shown; null where there is none.
   DataViewer* Viewer() const;
+  /// The tab of that class in which a file is open; null where there is none.
+  template <class Tab>
+  Tab* TabOf(const std::string& path) const;
   DocumentFrame* AddFrame(std::unique_ptr<EditSession> session);
   void ReloadDocument(DocumentFrame* frame);
   /// Shows what a save would change; true when the user has then saved.

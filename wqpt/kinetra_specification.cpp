@@ -216,6 +216,16 @@ std::vector<std::string> CKinetraSpecKvf::RefreshTemplates() {
   return added;
 }
 
+std::vector<std::string> CKinetraSpecKvf::TemplatesOtherOnDisk() const {
+  std::vector<std::string> paths;
+  for (int compartment = 0; compartment < kKinetraCompartments; ++compartment) {
+    const KinetraTemplate& content = Solver(compartment).Content();
+    if (!IsCompartmentActive(1 << compartment) || std::ranges::find(paths, content.path) != paths.end()) continue;
+    if (content.IsOtherOnDisk()) paths.push_back(content.path);
+  }
+  return paths;
+}
+
 void CKinetraSpecKvf::CompleteLayers() {
   std::vector<std::string> added;
   if (IsCompartmentActive(kSaturated)) SynchronizeValues(kKinetraSaturated, added);

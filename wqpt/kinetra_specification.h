@@ -93,6 +93,8 @@ class CKinetraSpecKvf : public CTvnKvfBase, public ProcessTemplates {
   void CompleteLayers();
   /// Reads the templates of all active compartments anew, with the same step. Gives what was added, in words.
   std::vector<std::string> RefreshTemplates();
+  /// The templates in use whose files are others now than when they were read, each once.
+  std::vector<std::string> TemplatesOtherOnDisk() const;
 
   void ReadData(KvfNode* section) override;
   /// Warnings alone: templates that cannot be read, symbols that are declared twice.

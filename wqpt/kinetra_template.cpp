@@ -8,7 +8,6 @@
 #include <fmt/format.h>
 
 #include "core/kvf.h"
-#include "platform/file_cache.h"
 #include "platform/item_types.h"
 #include "platform/text.h"
 #include "platform/units.h"
@@ -23,19 +22,16 @@ constexpr const char* kTarget = "KINETRA_SETUP";
 /// Forcings that are the user's, whatever the file says.
 constexpr int kForcingsOfUsers[] = {5, 6, 23};
 
-struct TemplateSection {
-  const char* section;
-  const char* item;
-  Kind kind;
-  std::vector<CKinetraSolverItem> KinetraTemplate::*items;
-};
-constexpr TemplateSection kTemplateSections[] = {
-    {"STATE_VARIABLES", "STATE_VARIABLE_{}", Kind::StateVariable, &KinetraTemplate::stateVariables},
-    {"CONSTANTS", "CONSTANT_{}", Kind::Constant, &KinetraTemplate::constants},
-    {"FORCINGS", "FORCING_{}", Kind::Forcing, &KinetraTemplate::forcings},
-    {"AUXILIARY_VARIABLES", "AUXILIARY_VARIABLE_{}", Kind::Auxiliary, &KinetraTemplate::auxiliaries},
-    {"PROCESSES", "PROCESS_{}", Kind::Process, &KinetraTemplate::processes},
-    {"DERIVED_OUTPUTS", "DERIVED_OUTPUT_{}", Kind::DerivedOutput, &KinetraTemplate::derivedOutputs}};
+constexpr KinetraSection kTemplateSections[] = {
+    {"STATE_VARIABLES", "STATE_VARIABLE_{}", Kind::StateVariable, "State variable", "State variables",
+     &KinetraTemplate::stateVariables},
+    {"CONSTANTS", "CONSTANT_{}", Kind::Constant, "Constant", "Constants", &KinetraTemplate::constants},
+    {"FORCINGS", "FORCING_{}", Kind::Forcing, "Forcing", "Forcings", &KinetraTemplate::forcings},
+    {"AUXILIARY_VARIABLES", "AUXILIARY_VARIABLE_{}", Kind::Auxiliary, "Auxiliary variable", "Auxiliary variables",
+     &KinetraTemplate::auxiliaries},
+    {"PROCESSES", "PROCESS_{}", Kind::Process, "Process", "Processes", &KinetraTemplate::processes},
+    {"DERIVED_OUTPUTS", "DERIVED_OUTPUT_{}", Kind::DerivedOutput, "Derived output", "Derived outputs",
+     &KinetraTemplate::derivedOutputs}};
 constexpr const char* kEquations = "STATE_VARIABLE_EQUATIONS";
 constexpr const char* kEquation = "STATE_VARIABLE_EQUATION_{}";
 
@@ -55,8 +51,7 @@ bool SaysYes(KvfNode* section, const char* key) { return EqualIgnoringCase(TextA
 CKinetraSolverItem ReadItem(KvfNode* section, Kind kind) {
   CKinetraSolverItem item;
   item.kind = kind;
-  const bool isValue = kind == Kind::StateVariable || kind == Kind::Constant || kind == Kind::Forcing;
-  const bool isGiven = kind == Kind::Constant || kind == Kind::Forcing;
+  const bool isGiven = IsGiven(kind), isValue = isGiven || kind == Kind::StateVariable;
   if (kind != Kind::DerivedOutput) item.symbol = TextAt(section, "SYMBOL");
   kvfGetParam(section, "ID", &item.id, 1, 1);
   item.description = TextAt(section, "DESCRIPTION");
@@ -69,7 +64,9 @@ CKinetraSolverItem ReadItem(KvfNode* section, Kind kind) {
     kvfGetParam(section, "QTY_TYPE", &item.quantity, 1, 1);
     const ItemType* known = FindItemType(item.quantity);
     if (!known) item.quantity = quantity::kUndefined;
-    if (known && !BaseUnit(*known).abbreviation.empty()) item.unitText = BaseUnit(*known).abbreviation;
+    // What has no quantity has the unit that the file tells.
+    const bool hasUnit = known && (item.quantity != quantity::kUndefined || item.unitText.empty());
+    if (hasUnit && !BaseUnit(*known).abbreviation.empty()) item.unitText = BaseUnit(*known).abbreviation;
     kvfGetParam(section, "DEFAULT_VALUE", &item.defaultValue, 1, 1);
     kvfGetParam(section, "MIN_VALUE", &item.minimum, 1, 1);
     kvfGetParam(section, "MAX_VALUE", &item.maximum, 1, 1);
@@ -121,7 +118,7 @@ KinetraTemplate ReadTemplate(const std::string& path) {
     return read;
   }
   if (KvfNode* target = kvfTargetByNameNum(file, kTarget, 1)) {
-    for (const TemplateSection& row : kTemplateSections)
+    for (const KinetraSection& row : kTemplateSections)
       ForEachNumbered(kvfSectionByNameNum(target, row.section, 1), row.item,
                       [&](KvfNode* section) { (read.*row.items).push_back(ReadItem(section, row.kind)); });
     ForEachNumbered(kvfSectionByNameNum(target, kEquations, 1), kEquation,
@@ -161,10 +158,19 @@ std::vector<std::string> KinetraTemplate::Oddities() const {
   return odd;
 }
 
+std::span<const KinetraSection> KinetraSections() { return kTemplateSections; }
+
 std::shared_ptr<const KinetraTemplate> ReadKinetraTemplate(const std::string& path) {
   static FileCache<KinetraTemplate> cache(100);
   if (path.empty()) return std::make_shared<const KinetraTemplate>();
-  return cache.Get(path, "template", [&path] { return ReadTemplate(path); });
+  // Taken before the reading: what is written meanwhile makes another file of it.
+  const FileStamps stamps = StampsOf(path);
+  return cache.Get(path, "template", stamps, [&] {
+    KinetraTemplate read = ReadTemplate(path);
+    read.path = path;
+    read.stamps = stamps;
+    return read;
+  });
 }
 
 }  // namespace tervane

@@ -5,8 +5,11 @@
 #pragma once
 
 #include <memory>
+#include <span>
 #include <string>
 #include <vector>
+
+#include "platform/file_cache.h"
 
 namespace tervane {
 
@@ -50,6 +53,11 @@ struct CKinetraSolverItem {
 struct KinetraTemplate {
   std::vector<CKinetraSolverItem> stateVariables, constants, forcings, auxiliaries, processes, derivedOutputs;
   std::string problem;  ///< Why the file could not be read; empty for one that was, and where none is named.
+  std::string path;
+  FileStamps stamps;  ///< Of the file when it was read.
+
+  /// Whether the file is another one than it was when it was read.
+  bool IsOtherOnDisk() const { return !path.empty() && StampsOf(path) != stamps; }
 
   /// Places of the state variables that move with the water.
   std::vector<int> Transported() const;
@@ -58,6 +66,21 @@ struct KinetraTemplate {
   /// What a reader should know: symbols that differ in case only.
   std::vector<std::string> Oddities() const;
 };
+
+/// A constant or forcing: its value is none of the template's.
+constexpr bool IsGiven(KinetraItemKind kind) {
+  return kind == KinetraItemKind::Constant || kind == KinetraItemKind::Forcing;
+}
+
+/// A kind of declarations: where a template holds it, and what it is called.
+struct KinetraSection {
+  const char *section, *item;  ///< `{}` stands for the number of the item.
+  KinetraItemKind kind;
+  const char *name, *names;
+  std::vector<CKinetraSolverItem> KinetraTemplate::*items;
+};
+/// In the order of the file.
+std::span<const KinetraSection> KinetraSections();
 
 /// Reads a template. A file that is missing or no template gives an empty one with its problem. Two who name one file
 /// get the same content, until the file changes.

@@ -84,6 +84,16 @@ class CKinetraSpecDlg : public PageOf<CKinetraSpecKvf> {
         .EnabledWhen(isActive);
     form.Choice("Integration method", solver.method).EnabledWhen(isActive);
     form.Integer("Update frequency", solver.frequency).EnabledWhen(isActive);
+    const auto isOther = [&solver, isActive, this] {
+      return isActive.Holds(Node()) && solver.Content().IsOtherOnDisk();
+    };
+    constexpr const char* kIsOther = "the template has changed on disk";
+    form.Notice([&solver] { return fmt::format("The template {} has changed on disk", solver.file.Text()); })
+        .ShownWhen(kIsOther, isOther);
+    form.Button("Refresh", [this] { OnRefresh(); })
+        .Beside()
+        .ToolTip("Reads the templates of all active compartments again, as one step that can be undone")
+        .ShownWhen(kIsOther, isOther);
     form.Notice(
         [&solver] { return solver.Content().problem.empty() ? CountsOf(solver.Content()) : solver.Content().problem; });
   }

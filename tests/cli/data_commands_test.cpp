@@ -329,6 +329,32 @@ TEST(DataCommands, ARasterThatIsRefusedWritesNothing) {
   EXPECT_THAT(Tervane({"import", "grid", raster, out, "--item", "999"}).err, HasSubstr("--force"));
 }
 
+TEST(DataCommands, InfoTellsWhatATemplateDeclares) {
+  const TempFolder folder;
+  const std::string path = folder.Write(
+      "a.kinetra",
+      "target KINETRA_SETUP {\nsection STATE_VARIABLES {\nsection STATE_VARIABLE_1 {\nSYMBOL = \"O2\"\nDESCRIPTION = "
+      "\"Oxygen\"\nUNIT = \"mg/l\"\nDEFAULT_VALUE = 9\n}\n}\nsection CONSTANTS {\nsection CONSTANT_1 {\nSYMBOL = "
+      "\"k\"\nDEFAULT_VALUE = 0.5\nMIN_VALUE = 0\nMAX_VALUE = 2\n}\nsection CONSTANT_2 {\nSYMBOL = \"K\"\n}\n}\n"
+      "section STATE_VARIABLE_EQUATIONS {\nsection STATE_VARIABLE_EQUATION_1 {\nO2 = \"-k\"\n}\n}\n}\n");
+  const Outcome text = Tervane({"data", "info", path});
+  EXPECT_EQ(text.status, kDone);
+  EXPECT_EQ(text.out, path +
+                          ": 1 state variable, 2 constants, 0 forcings, 0 auxiliary variables, 0 processes, 0 derived "
+                          "outputs\nstate variable O2: Oxygen [mg/l], 9, changes by -k\nconstant k [-], 0.5 (0 to 2), "
+                          "given by the user\nconstant K [-], 0, given by the user\n");
+  EXPECT_THAT(text.err, HasSubstr("note: the symbol K is declared more than once"));
+  rapidjson::Document json;
+  json.Parse(Tervane({"data", "info", path, "--json"}).out.c_str());
+  ASSERT_FALSE(json.HasParseError());
+  EXPECT_STREQ(json["stateVariables"][0]["expression"].GetString(), "-k");
+  EXPECT_EQ(json["constants"][0]["maximum"].GetDouble(), 2);
+  EXPECT_FALSE(json["constants"][1].HasMember("maximum"));
+  const Outcome wrong = Tervane({"data", "info", folder.Write("b.kinetra", "target OTHER {\n}\n")});
+  EXPECT_EQ(wrong.status, kCouldNot);
+  EXPECT_THAT(wrong.err, HasSubstr("holds no target KINETRA_SETUP"));
+}
+
 TEST(DataCommands, InfoTellsTheEntriesOfALibrary) {
   const TempFolder folder;
   const std::string path = folder.Write("crops.etv",

@@ -49,6 +49,27 @@ TEST(DocumentFrame, AFindingLeadsToTheControlThatItSpeaksOf) {
   EXPECT_EQ(findings->Count(), 2);
 }
 
+TEST(DocumentFrame, AFindingOffersWhatMendsItAsOneStep) {
+  OpenedSetup setup(
+      "section SimSpec {\nsection ModelComp {\nWQ = 1\n}\n}\nsection Species {\nNumberOfSpecies = 1\n}\n"
+      "section Sources {\nNumberOfSources = 1\nsection Source_1 {\nSpecies = \"gone\"\nExtentType = 0\n}\n}\n");
+  auto* findings = setup.Frame().findChild<FindingsView*>();
+  const auto found = findings->findItems("names a species that the setup does not have", Qt::MatchContains, 2);
+  ASSERT_EQ(found.size(), 1);
+  QMenu menu;
+  findings->FillMenu(menu, found.front());
+  QAction* mend = nullptr;
+  for (QAction* action : menu.actions())
+    if (action->text() == "Change Species to Species_1") mend = action;
+  ASSERT_TRUE(mend);
+  const int before = findings->Count();
+  mend->trigger();
+  EXPECT_EQ(setup.Value("Sources/Source_1:Species"), "\"Species_1\"");
+  EXPECT_EQ(findings->Count(), before - 1);
+  setup.Command("Undo Change Species to Species_1");
+  EXPECT_EQ(findings->Count(), before);
+}
+
 TEST(DocumentFrame, ANodeThatLeavesTheSetupGivesItsPlaceToTheNearestAbove) {
   OpenedSetup setup(kWaterQualityTooEarly);
   setup.GoTo("SimSpec:WQ");
