@@ -28,6 +28,7 @@ struct CoverageFile {
   std::string path;          ///< Of its node.
   std::uint64_t serial = 0;  ///< Of its node.
   std::string title;         ///< What it holds: "Topography", "Sion: Precipitation Rate".
+  std::string quantity;      ///< The same without whose it is: "Precipitation Rate".
   FileUse use;
   std::optional<GridSource> values;         ///< The quantity that is to have a value in every cell of the domain.
   bool mayLeaveCells = false;               ///< Or in some of them.

@@ -7,20 +7,25 @@
 #include "simspec/periods.h"
 #include "spatial/coverage.h"
 #include "spatial/data2d.h"
+#include "spatial/owner_titles.h"
 #include "spatial/zone_sync.h"
 
 namespace tervane {
 
 namespace {
 
-/// What a node is called for people: the title of the nearest page above, with the station's name.
-std::string TitleOf(const CYbSEKvfBase& node) {
+/// What the file of a node is called for people: by the nearest page above, with whose it is: the station, and what the
+/// page is a part of.
+void GiveTitles(const CYbSEKvfBase& node, CoverageFile& file) {
   const CYbSEKvfBase* shown = &node;
   while (shown && !shown->GetDlgRuntimeClass(kSetupDataTree)) shown = shown->GetParent();
-  if (!shown) return node.GetTitle();
+  if (!shown) shown = &node;
+  file.quantity = shown->GetTitle();
+  std::string owners = OwnersOf(*shown);
   const std::string& name = shown->GetAbbreviatedTitle();
-  const bool isOneOfMany = dynamic_cast<const CFMSEKvfGroupBase*>(shown) != nullptr;
-  return isOneOfMany && !name.empty() ? fmt::format("{}: {}", name, shown->GetTitle()) : shown->GetTitle();
+  if (dynamic_cast<const CFMSEKvfGroupBase*>(shown) && !name.empty())
+    owners = owners.empty() ? name : fmt::format("{}, {}", owners, name);
+  file.title = WithOwners(owners, file.quantity);
 }
 
 std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
@@ -35,7 +40,7 @@ CoverageFile AskFile(const CYbSEKvfBase& node, const std::string& path, FileUse 
   CoverageFile file;
   file.path = path;
   file.serial = node.Serial();
-  file.title = TitleOf(node);
+  GiveTitles(node, file);
   file.findings = node.Findings();
   // What the owner makes of the file, or its grid as it is.
   if (auto* owner = dynamic_cast<CellValues*>(node.GetParent()); owner && use.isOverArea) {
@@ -62,8 +67,10 @@ void AddRequestsBelow(const CYbSEKvfBase& node, WalkedNode& place, CoverageReque
       if (std::optional<FileUse> use = user->UsedFile())
         request.files.push_back(AskFile(*child, childPlace.Path(), *std::move(use)));
     if (const auto* driver = dynamic_cast<const ForcingNode*>(child))
-      for (Forcing& forcing : driver->CurrentForcings())
+      for (Forcing& forcing : driver->CurrentForcings()) {
+        forcing.title = WithOwners(OwnersOf(*child), forcing.title);
         request.forcings.push_back({childPlace.Path(), child->Serial(), std::move(forcing)});
+      }
     if (const auto* checker = dynamic_cast<const CellChecker*>(child))
       for (CellCheck& check : checker->CurrentChecks())
         request.checks.push_back({childPlace.Path(), child->Serial(), std::move(check)});

@@ -71,7 +71,7 @@ std::string ForcingTotals::ValueText(std::size_t column, std::size_t period, con
 std::string MissingCellsText(const CoverageRow& row) {
   if (row.missing == 0 || (row.file.mayLeaveCells && row.missing < row.cells)) return {};
   return fmt::format("{} of the domain {} no {}", row.missing == 1 ? "1 cell" : fmt::format("{} cells", row.missing),
-                     row.missing == 1 ? "has" : "have", LowerCase(row.file.title));
+                     row.missing == 1 ? "has" : "have", LowerCase(row.file.quantity));
 }
 
 std::string CoverageRow::PeriodText() const {

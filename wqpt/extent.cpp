@@ -2,6 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "wqpt/extent.h"
 
+#include <fmt/format.h>
+
+#include "geometry/grid_polygons.h"
+#include "platform/paths.h"
 #include "platform/units.h"
 #include "wqpt/pages.h"
 
@@ -18,6 +22,31 @@ const Data2DKind kExtentLevels[] = {
      .section = "BottomElevation",
      .title = "Lower Level",
      .itemType = quantity::kElevation}};
+
+constexpr float kInside = 1;
+
+FileResult PutPolygonsOnGrid(const GridSource& source, ProgressPart progress, CTvn2DOrthoRotatedGridData& grid) {
+  const auto refused = [&source](std::string_view why) {
+    return FileResult{fmt::format("cannot use {}: {}", source.file, why), {}};
+  };
+  if (const std::string problem = source.geometry.Problem(); !problem.empty()) return refused(problem);
+  CTvnShapeData shapes;
+  shapes.SetAxisLengthUnit(source.axisUnit);
+  constexpr double kReading = 0.5;
+  FileResult read = shapes.ReadShapeFile(source.file, progress.Part(0, kReading));
+  if (!read.Ok()) return read;
+  if (shapes.Kind() != ShapeKind::Polygon) return refused("polygons were expected");
+  try {
+    std::vector<float> values(source.geometry.CellCount(), kUsualDeleteValue);
+    const std::vector<float> codes(shapes.GetData().size(), kInside);
+    PutPolygons(shapes.GetData(), codes, source.geometry, kUsualDeleteValue, values, progress.Part(kReading, 1));
+    read.error =
+        grid.TakeValues(source.geometry, std::move(values), kUsualDeleteValue, kWholeNumberUnit, quantity::kCode);
+  } catch (const Cancelled&) {
+    return refused("cancelled");
+  }
+  return read;
+}
 
 }  // namespace
 
@@ -38,6 +67,20 @@ ExtentKvf::ExtentKvf(std::string_view className, Condition takesPart, CYbSEKvfBa
 
 GridSource ExtentKvf::CurrentSource() const {
   return type == kShapeFile ? CodesOfPolygons(*shapeFile_, ShapeAxisUnit, {}) : CodesOfGrid(*gridFile_);
+}
+
+std::shared_ptr<ComputedGrid> ExtentKvf::GridComputation() {
+  if (type != kShapeFile) return nullptr;
+  GridSource source = CurrentSource();
+  if (!kept_ || keptSource_ != source) {
+    keptSource_ = source;
+    kept_ = std::make_shared<ComputedGrid>(
+        fmt::format("Computing codes of {}", FileNameOf(source.file)),
+        [source = std::move(source)](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
+          return PutPolygonsOnGrid(source, progress, grid);
+        });
+  }
+  return kept_;
 }
 
 void ExtentKvf::ExchangeKeys(KeyExchange& keys) {

@@ -24,6 +24,9 @@ class ExtentKvf : public CYbSEKvfGroupBase, public CellValues {
   CData2DShpFile& ShapeFile() const { return *shapeFile_; }
 
   GridSource CurrentSource() const override;
+  /// Of polygons: code 1 in the cells of any of them, whatever their attributes. Null for a grid, which is read as it
+  /// is.
+  std::shared_ptr<ComputedGrid> GridComputation() override;
   bool MayLeaveCells() const override { return true; }
 
  protected:
@@ -32,6 +35,9 @@ class ExtentKvf : public CYbSEKvfGroupBase, public CellValues {
  private:
   CTvnData2DNdsFile* gridFile_;
   CData2DShpFile* shapeFile_;
+  /// The latest, while what decides it stays.
+  GridSource keptSource_;
+  std::shared_ptr<ComputedGrid> kept_;
 };
 
 /// How far something goes over the model area.

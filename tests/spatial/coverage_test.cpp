@@ -10,6 +10,7 @@
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "geometry/shapes.h"
+#include "simspec/model_components.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
@@ -18,6 +19,8 @@
 #include "surface/land_use.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
+#include "wqpt/sources.h"
+#include "wqpt/species.h"
 
 namespace tervane::coverage_test {
 namespace {
@@ -147,6 +150,36 @@ TEST_F(Coverage, ZonesThatSpeakOfAPartOfTheModelMayLeaveCells) {
     EXPECT_EQ(row.AreaText(), c.text);
     EXPECT_EQ(MissingCellsText(row), c.warning);
     EXPECT_EQ(row.state == CoverageState::Warning, *c.warning != 0) << c.text;
+  }
+}
+
+TEST_F(Coverage, KnowsWhereSourcesLieAndWhoseAQuantityIs) {
+  document_.Root().Important(kModelComponents)->WQ = 1;
+  document_.Root().Important(kSpecies)->AddItem();
+  auto& sources = *document_.Root().Important(kSources);
+  sources.AddItemNode();
+  CSourceWQItemKvf& source = *sources.GetItem(1);
+  source.SourceName = "Landfill";
+  source.SetSourceType(1);
+  auto& extent = *source.Child<ExtentKvf>();
+  extent.type = ExtentKvf::kShapeFile;
+  extent.ShapeFile().Choose(FileName("landfill.shp", folder_.Path()), {});
+  const struct {
+    double from, to;
+    const char* text;
+    bool isWarning;
+  } cases[] = {{300, 500, "covers 20 of 100 cells", false}, {901, 949, "covers no cell of the domain", true}};
+  for (const auto& c : cases) {
+    // Polygons need no attribute.
+    WritePolygons("landfill.shp", {{c.from, c.to}});
+    const auto board = Board();
+    const CoverageRow& row = RowOf(*board, "landfill.shp");
+    EXPECT_EQ(row.problem, "");
+    EXPECT_EQ(row.file.title, "Landfill: Horizontal Extent");
+    EXPECT_EQ(row.AreaText(), c.text);
+    EXPECT_EQ(row.state == CoverageState::Warning, c.isWarning) << c.text;
+    ASSERT_FALSE(board->forcings.empty());
+    EXPECT_EQ(board->forcings.back().forcing.forcing.title, "Landfill: Strength");
   }
 }
 
