@@ -23,12 +23,15 @@
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/domain_boundary.h"
+#include "spatial/owner_titles.h"
+#include "spatial/soil_layers.h"
 #include "spatial/stations.h"
 #include "spatial/zones.h"
 #include "subsurface/computational_layers.h"
 #include "subsurface/saturated_zone.h"
 #include "subsurface/wells.h"
 #include "surface/vegetation.h"
+#include "wqpt/extent.h"
 
 namespace tervane {
 
@@ -200,6 +203,10 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
     ShowWells(*wells, page);
   } else if (auto* quantity = dynamic_cast<CData2DKvf*>(&node)) {
     ShowQuantity(*quantity, page);
+  } else if (auto* extent = dynamic_cast<ExtentKvf*>(&node)) {
+    ShowExtent(*extent, page);
+  } else if (const auto* soil = dynamic_cast<const CUnSatInitConditionLayerListKvf*>(&node)) {
+    ShowSoilValues(*soil, page);
   } else if (auto* zones = dynamic_cast<CodedZonesKvf*>(&node)) {
     ShowZones(*zones, page);
     if (const auto* driver = dynamic_cast<const ForcingNode*>(&node)) AddForcings(*driver, page);
@@ -226,6 +233,9 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
 }
 
 void Preprocessor::ShowGrid(ModelGrid grid, ReportPage& page) {
+  // In the list of all grids and in messages a quantity needs the name of what it is a part of.
+  if (const CYbSEKvfBase* node = FindNode(document_.Root(), ParseSetupPath(grid.place).steps))
+    grid.title = WithOwners(OwnersOf(*node), grid.title);
   page.ShowGrid(grids_.Path(), grids_.Add(std::move(grid)));
 }
 
@@ -319,6 +329,32 @@ void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {
   if (&quantity != document_.Root().Important(kTopography)) return;
   report_.topographyFile = grids_.Path();
   report_.topographyItem = static_cast<int>(grids_.Grids().size());
+}
+
+void Preprocessor::ShowExtent(ExtentKvf& extent, ReportPage& page) {
+  const auto make = [source = extent.CurrentSource(),
+                     polygons = extent.GridComputation()](CTvn2DOrthoRotatedGridData& grid) -> FileResult {
+    if (!polygons) return BuildGrid(source, {}, grid);
+    polygons->Run();
+    if (!polygons->Result()) return {polygons->Problem(), {}};
+    grid = *polygons->Result();
+    return {};
+  };
+  const auto nameOfCode = [](int) { return std::string("inside"); };
+  ShowGrid({page.title, PathOf(extent), quantity::kCode, make, nameOfCode, true, {}, {}}, page);
+}
+
+void Preprocessor::ShowSoilValues(const CUnSatInitConditionLayerListKvf& values, ReportPage& page) {
+  switch (values.DistributionType) {
+    case CUnSatInitConditionLayerListKvf::kUniform:
+      return page.ShowText(
+          fmt::format("{} at all depths", WithUnit(values.Distribution_UniformValue, values.GetItemType())));
+    case CUnSatInitConditionLayerListKvf::kByLayers:
+      // The pages below have them.
+      return page.ShowText(fmt::format("By layers: {}", values.GetItemCount()));
+    default:
+      return page.ShowLayers(values.GridFile().File.Absolute(), values.GridFile().SelectedItem());
+  }
 }
 
 void Preprocessor::ShowZones(CodedZonesKvf& zones, ReportPage& page) {

@@ -24,10 +24,12 @@ class CFMSEKvfBase;
 class CSZVerDiscrLayerKvf;
 class CSZWellKvf;
 class CSatZoneKvf;
+class CUnSatInitConditionLayerListKvf;
 class CVegetationKvf;
 class CellValues;
 class CodedZonesKvf;
 class DataFileNode;
+class ExtentKvf;
 class ForcingNode;
 class VegetationCourse;
 
@@ -55,6 +57,8 @@ class Preprocessor {
   bool FillPage(CYbSEKvfBase& node, ReportPage& page);
   void ShowDomain(ReportPage& page);
   void ShowQuantity(CData2DKvf& quantity, ReportPage& page);
+  void ShowExtent(ExtentKvf& extent, ReportPage& page);
+  void ShowSoilValues(const CUnSatInitConditionLayerListKvf& values, ReportPage& page);
   void ShowZones(CodedZonesKvf& zones, ReportPage& page);
   /// What zones want or may take over time, a page each.
   void AddForcings(const ForcingNode& node, ReportPage& page);

@@ -125,6 +125,8 @@ bool ModelGridFile::Write(const CTvn2DOrthoRotatedGridData& domain, WorkLog& log
     if (isCode)
       for (const float value : values)
         if (value != kDeleteValue) ++grid.cellsOfCode[static_cast<int>(std::lround(value))];
+    if (grid.mayLeaveCells && grid.values.count == 0)
+      log.Warning(grid.place, fmt::format("{} has no value in any cell of the domain", grid.title));
     if (missing > 0 && !grid.mayLeaveCells)
       log.Warning(grid.place, fmt::format("{} cells of the domain have no {}", missing, grid.title));
     if (const std::string error = writer.Put(static_cast<int>(n) + 1, values); !error.empty()) {

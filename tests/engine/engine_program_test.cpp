@@ -32,6 +32,9 @@
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
+#include "wqpt/registration_lenses.h"
+#include "wqpt/sources.h"
+#include "wqpt/species.h"
 
 namespace tervane::engine_program_test {
 namespace {
@@ -160,6 +163,41 @@ TEST_F(EngineProgram, TellsWhereAndHowMuchIsIrrigated) {
   source.LicenseFile().Choose(FileName("away.nds0", folder.Path()));
   EXPECT_EQ(Run("/PP"), kEngineFailed);
   EXPECT_THAT(log, HasSubstr("Source1/TIME_SERIES_FILE:FILE_NAME: cannot read"));
+}
+
+TEST_F(EngineProgram, PutsConcentrationsSourcesAndLensesOnTheCellsUnderTheirOwnersNames) {
+  // Codes on the western column, which has two cells in the domain's south.
+  WriteGrid("west.nds2", {1, 4, 100, 1000, 2000, 0, {}}, {4, 4, kEmpty, kEmpty}, quantity::kCode);
+  CModelCompKvf& components = *document.Root().Important(kModelComponents);
+  components.WQ = components.SZ = 1;
+  CModelCompWQKvf& quality = *document.Root().Important(kWaterQualityComponents);
+  quality.SZ = 1;
+  document.Root().Important(kSpecies)->AddItem()->SetName("Salt");
+  auto& sources = *document.Root().Important(kSources);
+  sources.AddItemNode();
+  CSourceWQItemKvf& source = *sources.GetItem(1);
+  source.SourceName = "Landfill";
+  source.SetSourceType(1);
+  source.Strength().Global().FIXED_VALUE = 2;
+  source.Child<ExtentKvf>()->GridFile().Choose(FileName("west.nds2", folder.Path()));
+
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  std::string report = test::ReadFile(ReportPath());
+  for (const char* expected : {"Landfill: Horizontal Extent: 0.02 km2 in 2 cells", "4, inside: 0.02 km2",
+                               "2 kg/s, constant", "Aquifer: Initial Concentration, Salt: 0 "})
+    EXPECT_THAT(report, HasSubstr(expected));
+  EXPECT_THAT(log, Not(HasSubstr("have no Horizontal")));  // a source is where it is
+
+  components.ADPTRadio = kParticleTracking;
+  document.Root().Important(kParticleTrackingComponents)->RegistrationZoneRadio = CModelCompPTKvf::kByLenses;
+  CRegLensePTItemKvf& lens = *document.Root().Important(kRegistrationLenses)->AddItem();
+  lens.LenseName = "Gravel";
+  lens.Child<ExtentKvf>()->GridFile().Choose(FileName("west.nds2", folder.Path()));
+  WriteGrid("west.nds2", {1, 4, 100, 5000, 2000, 0, {}}, {4, 4, kEmpty, kEmpty}, quantity::kCode);
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  report = test::ReadFile(ReportPath());
+  EXPECT_THAT(report, HasSubstr("Gravel: Upper Level: 0 m everywhere"));
+  EXPECT_THAT(log, HasSubstr("Gravel: Horizontal Extent has no value in any cell of the domain"));
 }
 
 TEST_F(EngineProgram, LeavesTheRiverNetworkAsLines) {
