@@ -2,9 +2,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/wqpt/source_pages.h"
 
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
 #include "forms/table_of.h"
 #include "pages/parts/file_controls.h"
 #include "pages/parts/plot_content.h"
+#include "pages/wqpt/source_chart.h"
 #include "wqpt/pages.h"
 #include "wqpt/sources.h"
 #include "wqpt/species.h"
@@ -20,7 +24,28 @@ CellChoices TypesAt(CSourceWQItemKvf& source) {
   return choices;
 }
 
-void DescribeSources(PageForm& form, CSourcesWQListKvf& n) {
+class CSourcesDlg : public PageOf<CSourcesWQListKvf> {
+ public:
+  using PageOf::PageOf;
+
+ protected:
+  void Describe(PageForm& form) override {
+    DescribeTable(form);
+    form.Notice([this] { return fmt::format("Not among the curves: {}", fmt::join(chart_.Left(), "; ")); })
+        .ShownWhen("a source is not among the curves", [this] { return !chart_.Left().empty(); });
+    form.Chart([this] { return chart_.Content(Node()); })
+        .Caption("Sources over the time of the simulation")
+        .ShownWhen("there are sources", [this] { return Node().GetItemCount() > 0; });
+  }
+
+ private:
+  void DescribeTable(PageForm& form);
+
+  SourceChart chart_;
+};
+
+void CSourcesDlg::DescribeTable(PageForm& form) {
+  CSourcesWQListKvf& n = Node();
   using Source = CSourceWQItemKvf;
   constexpr int kRowsChange = kTreeRebuilt | kDataChanged;
   auto table = std::make_shared<TableOf<Source>>(n);
@@ -74,7 +99,7 @@ void DescribeExtent(PageForm& form, ExtentKvf& n, CYbSEDlgBase& page) {
 
 std::span<const PageRow> SourcePages() {
   static constexpr PageRow kRows[] = {
-      DescribedBy<DescribeSources>(kSourcesPage),
+      PageIs<CSourcesDlg, CSourcesWQListKvf>(kSourcesPage),
       DescribedBy<DescribeExtent>(kExtentPage),
   };
   return kRows;

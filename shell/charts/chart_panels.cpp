@@ -19,9 +19,9 @@ ChartPanels::ChartPanels(QCustomPlot& chart, int firstRow)
   connect(chart.xAxis, qOverload<const QCPRange&>(&QCPAxis::rangeChanged), this, &ChartPanels::Follow);
 }
 
-void ChartPanels::SetUp(int count, bool hasStrip, const std::optional<NumberAxis>& numbers) {
-  hasStrip_ = hasStrip;
-  count = std::max(count, 1) + (hasStrip ? 1 : 0);
+void ChartPanels::SetUp(int count, int stripLines, const std::optional<NumberAxis>& numbers) {
+  stripLines_ = stripLines;
+  count = std::max(count, 1) + (stripLines > 0 ? 1 : 0);
   while (static_cast<int>(rects_.size()) > count) {
     chart_.plotLayout()->remove(rects_.back());
     rects_.pop_back();
@@ -44,7 +44,7 @@ void ChartPanels::SetUp(int count, bool hasStrip, const std::optional<NumberAxis
 
 void ChartPanels::SetUpPanel(QCPAxisRect& rect, const std::optional<NumberAxis>& numbers) {
   const bool isStrip = &rect == Strip(), isLast = &rect == rects_.back();
-  const int height = QFontMetrics(QApplication::font()).height() + Theme::Get().Scaled(6);
+  const int height = stripLines_ * (QFontMetrics(QApplication::font()).height() + Theme::Get().Scaled(6));
   rect.setMinimumSize(0, isStrip ? height : 0);
   rect.setMaximumSize(QWIDGETSIZE_MAX, isStrip ? height : QWIDGETSIZE_MAX);
   QCPAxis *keys = rect.axis(QCPAxis::atBottom), *opposite = rect.axis(QCPAxis::atTop);

@@ -24,12 +24,13 @@ class ChartPanels : public QObject {
   /// `firstRow` is the row of the chart's layout in which its own axes stand.
   ChartPanels(QCustomPlot& chart, int firstRow);
 
-  /// Makes so many charts, below a strip where one is wanted; those beyond go. The chart must hold nothing meanwhile.
-  void SetUp(int count, bool hasStrip, const std::optional<NumberAxis>& numbers);
+  /// Makes so many charts, below a strip of so many lines where that is above 0; those beyond go. The chart must hold
+  /// nothing meanwhile.
+  void SetUp(int count, int stripLines, const std::optional<NumberAxis>& numbers);
   /// All from top to bottom, a strip too.
   const std::vector<QCPAxisRect*>& Rects() const { return rects_; }
-  /// The strip above the charts, a line of text high; null without one.
-  QCPAxisRect* Strip() const { return hasStrip_ ? rects_.front() : nullptr; }
+  /// The strip above the charts; null without one.
+  QCPAxisRect* Strip() const { return stripLines_ > 0 ? rects_.front() : nullptr; }
   /// The horizontal axis of the first chart, which all others follow.
   QCPAxis& Keys() const;
   QCPAxis& Keys(int panel) const;
@@ -40,14 +41,14 @@ class ChartPanels : public QObject {
 
  private:
   void SetUpPanel(QCPAxisRect& rect, const std::optional<NumberAxis>& numbers);
-  QCPAxisRect& Panel(int panel) const { return *rects_[static_cast<std::size_t>(panel + (hasStrip_ ? 1 : 0))]; }
+  QCPAxisRect& Panel(int panel) const { return *rects_[static_cast<std::size_t>(panel + (stripLines_ > 0 ? 1 : 0))]; }
   void Follow(const QCPRange& range);
 
   QCustomPlot& chart_;
   int firstRow_;
   QCPMarginGroup* margins_;
   std::vector<QCPAxisRect*> rects_;
-  bool hasStrip_ = false;
+  int stripLines_ = 0;
 };
 
 }  // namespace tervane

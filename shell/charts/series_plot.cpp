@@ -166,7 +166,10 @@ void SeriesPlot::Build() {
   int panels = 1;
   for (const Series& series : content_.series) panels = std::max(panels, series.panel + 1);
   const bool hasBars = !content_.IsEmpty() && !content_.numbers && !content_.bars.empty();
-  panels_->SetUp(panels, hasBars, content_.numbers);
+  // More bars at once are drawn without their names.
+  constexpr int kMostLines = 8;
+  const int stripLines = hasBars ? std::min(TimeBarPlottable::LanesOf(content_.bars), kMostLines) : 0;
+  panels_->SetUp(panels, stripLines, content_.numbers);
   if (hasBars) BuildStrip();
   // Of each of several charts, and of the axis below the last one.
   constexpr int kPanelHeight = 100, kAxisHeight = 54;

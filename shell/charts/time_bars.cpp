@@ -14,18 +14,53 @@
 
 namespace tervane {
 
+namespace {
+
+/// The lane of each bar, from the top, for bars with a start and an end.
+std::vector<int> LanesFor(const std::vector<TimeBar>& bars) {
+  std::vector<int> lanes(bars.size(), 0);
+  if (std::ranges::any_of(bars, [](const TimeBar& bar) { return bar.kind != TimeBar::Kind::Thing; })) return lanes;
+  std::vector<CYbDateTime> ends;  // Of what stands last in each lane.
+  for (std::size_t i = 0; i < bars.size(); ++i) {
+    const auto free = std::ranges::find_if(ends, [&](const CYbDateTime& end) { return end <= bars[i].start; });
+    lanes[i] = static_cast<int>(free - ends.begin());
+    if (free == ends.end())
+      ends.push_back(bars[i].end);
+    else
+      *free = bars[i].end;
+  }
+  return lanes;
+}
+
+std::vector<TimeBar> WithDates(const std::vector<TimeBar>& bars) {
+  std::vector<TimeBar> dated;
+  for (const TimeBar& bar : bars)
+    if (bar.start.IsValid() && bar.end.IsValid() && bar.end > bar.start) dated.push_back(bar);
+  std::ranges::stable_sort(dated, {}, &TimeBar::start);
+  return dated;
+}
+
+}  // namespace
+
+int TimeBarPlottable::LanesOf(const std::vector<TimeBar>& bars) {
+  const std::vector<int> lanes = LanesFor(WithDates(bars));
+  return lanes.empty() ? 1 : *std::ranges::max_element(lanes) + 1;
+}
+
 TimeBarPlottable::TimeBarPlottable(QCPAxis* keys, QCPAxis* values, const std::vector<TimeBar>& bars)
     : QCPAbstractPlottable(keys, values) {
   removeFromLegend();
   std::map<std::string, std::size_t> colors;
-  for (const TimeBar& bar : bars) {
-    if (!bar.start.IsValid() || !bar.end.IsValid() || bar.end <= bar.start) continue;
+  const std::vector<TimeBar> dated = WithDates(bars);
+  const std::vector<int> lanes = LanesFor(dated);
+  for (std::size_t i = 0; i < dated.size(); ++i) {
+    const TimeBar& bar = dated[i];
     const std::size_t color =
         bar.kind == TimeBar::Kind::Thing ? colors.emplace(bar.name, colors.size()).first->second : 0;
-    bars_.push_back({AxisCoordinate(bar.start), AxisCoordinate(bar.end), ToQt(bar.name), color, bar.kind});
+    bars_.push_back({AxisCoordinate(bar.start), AxisCoordinate(bar.end), ToQt(bar.name), color, bar.kind, lanes[i]});
     longest_ = std::max(longest_, bars_.back().end - bars_.back().start);
+    lanes_ = std::max(lanes_, lanes[i] + 1);
   }
-  std::ranges::stable_sort(bars_, {}, &Bar::start);
 }
 
 QString TimeBarPlottable::NamesAt(double time) const {
@@ -52,14 +87,17 @@ void TimeBarPlottable::draw(QCPPainter* painter) {
   const QCPRange seen = keyAxis()->range();
   const QRect frame = keyAxis()->axisRect()->rect();
   // Bars of one pixel each run together: one of them is drawn.
-  double drawnTo = -1;
+  std::vector<double> drawn(static_cast<std::size_t>(lanes_), -1);
+  const double height = static_cast<double>(frame.height()) / lanes_;
   for (auto bar = std::ranges::lower_bound(bars_, seen.lower - longest_, {}, &Bar::start);
        bar != bars_.end() && bar->start <= seen.upper; ++bar) {
     if (bar->end < seen.lower) continue;
     const double left = std::max(keyAxis()->coordToPixel(bar->start), static_cast<double>(frame.left()));
     const double right = std::min(keyAxis()->coordToPixel(bar->end), static_cast<double>(frame.right()) + 1);
+    double& drawnTo = drawn[static_cast<std::size_t>(bar->lane)];
     if (right - left < 1 && right <= drawnTo) continue;
-    DrawBar(*painter, *bar, QRectF(left, frame.top() + 1, std::max(right - left, 1.0), frame.height() - 2));
+    DrawBar(*painter, *bar,
+            QRectF(left, frame.top() + bar->lane * height + 1, std::max(right - left, 1.0), height - 2));
     drawnTo = std::max(drawnTo, left + 1);
   }
 }
@@ -81,7 +119,7 @@ void TimeBarPlottable::DrawBar(QCPPainter& painter, const Bar& bar, const QRectF
   const QFontMetrics metrics(QApplication::font());
   const int margin = theme.Scaled(3);
   const int room = static_cast<int>(place.width()) - 2 * margin;
-  if (room < metrics.horizontalAdvance("MMM")) return;
+  if (room < metrics.horizontalAdvance("MMM") || place.height() < metrics.ascent()) return;
   painter.setPen(QApplication::palette().color(QPalette::Text));
   painter.setFont(QApplication::font());
   painter.drawText(place.adjusted(margin, 0, -margin, 0), Qt::AlignVCenter | Qt::AlignLeft,

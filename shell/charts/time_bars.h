@@ -11,12 +11,14 @@
 
 namespace tervane {
 
-/// Stretches of time as bars that fill the height of their chart, with their names where there is room. Gaps and
-/// overlaps are hatched.
+/// Stretches of time as bars, with their names where there is room. Gaps and overlaps are hatched. Things at once stand
+/// below each other, unless an overlap tells that they are.
 class TimeBarPlottable : public QCPAbstractPlottable {
  public:
   TimeBarPlottable(QCPAxis* keys, QCPAxis* values, const std::vector<TimeBar>& bars);
 
+  /// How many bars stand below each other: 1 where they follow each other.
+  static int LanesOf(const std::vector<TimeBar>& bars);
   /// What was going on at a time: the names of all bars there.
   QString NamesAt(double time) const;
 
@@ -34,12 +36,14 @@ class TimeBarPlottable : public QCPAbstractPlottable {
     QString name;
     std::size_t color;  ///< Of its name.
     TimeBar::Kind kind;
+    int lane = 0;
   };
 
   void DrawBar(QCPPainter& painter, const Bar& bar, const QRectF& place) const;
 
   std::vector<Bar> bars_;  ///< Ascending by their start.
   double longest_ = 0;     ///< Of all bars.
+  int lanes_ = 1;
 };
 
 }  // namespace tervane

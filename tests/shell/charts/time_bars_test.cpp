@@ -68,6 +68,19 @@ TEST_F(TimeBars, StandInAStripAboveTheCurvesAndAreToldAtThePointer) {
   EXPECT_NE(ColorAt(28), ColorAt(58));
 }
 
+TEST_F(TimeBars, ThingsAtOnceStandBelowEachOtherWhereNoOverlapTellsOfThem) {
+  EXPECT_EQ(TimeBarPlottable::LanesOf(Crops().bars), 1);
+  const int oneLine = Rects()[0]->height();
+  SeriesContent sources = Crops();
+  sources.bars = {{"North", Day(0), Day(100)}, {"South", Day(0), Day(40)}, {"West", Day(40), Day(60)}};
+  EXPECT_EQ(TimeBarPlottable::LanesOf(sources.bars), 2);
+  Show(std::move(sources));
+  EXPECT_EQ(Rects()[0]->height(), 2 * oneLine);
+  // In one lane they would have one colour, that of what lies above the other.
+  EXPECT_NE(ColorAt(20), ColorAt(50));
+  EXPECT_THAT(StatusAt(50), testing::EndsWith("North, West"));
+}
+
 TEST_F(TimeBars, ComeAndGoWithTheContent) {
   SeriesContent without = Crops();
   without.bars.clear();
