@@ -12,6 +12,7 @@
 #include "subsurface/drainage.h"
 #include "subsurface/geology.h"
 #include "subsurface/ground_layers.h"
+#include "subsurface/initial_totals.h"
 #include "subsurface/pages.h"
 #include "subsurface/wells.h"
 #include "wqpt/registration_lenses.h"
@@ -95,6 +96,8 @@ bool CSatZoneKvf::AddWellOverlaySection(KvfFile* file, std::string& error) const
 }
 
 std::vector<CellCheck> CSatZoneKvf::CurrentChecks() const { return GroundChecksOf(*this); }
+
+std::optional<CellTotals> CSatZoneKvf::TotalsOf(CData2DKvf& quantity) const { return InitialTotalsOf(*this, quantity); }
 
 const std::string& CSatZoneKvf::GetTitle() const {
   static const std::string withModflow = "Subsurface";

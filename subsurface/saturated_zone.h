@@ -8,6 +8,7 @@
 
 #include "simspec/modflow_output.h"
 #include "spatial/cell_checks.h"
+#include "spatial/cell_totals.h"
 #include "spatial/geo_data.h"
 #include "wqpt/ground.h"
 
@@ -23,7 +24,8 @@ class CSatZoneKvf : public CYbSEKvfBase,
                     public GroundParameterDistribution,
                     public ImmobileWaterChoice,
                     public WellChoice,
-                    public CellChecker {
+                    public CellChecker,
+                    public TotalsOfQuantities {
  public:
   explicit CSatZoneKvf(CYbSEKvfBase* parent);
 
@@ -55,6 +57,8 @@ class CSatZoneKvf : public CYbSEKvfBase,
 
   /// That levels lie in order, heads and screens in the ground, and that codes have a unit.
   std::vector<CellCheck> CurrentChecks() const override;
+  /// Of what computational layers begin with.
+  std::optional<CellTotals> TotalsOf(CData2DKvf& quantity) const override;
   /// With a Modflow engine the zone is called another name.
   const std::string& GetTitle() const override;
   /// Adds a section that tells a viewer of scenes of the wells, where they are included. False, with the reason in

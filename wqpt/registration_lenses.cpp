@@ -60,6 +60,8 @@ CRegLensePTListKvf::CRegLensePTListKvf(CYbSEKvfBase* parent)
                 ParticlesAre(&CModelCompPTKvf::RegistrationZoneRadio, CModelCompPTKvf::kByLenses));
 }
 
+bool IsParticleNumber(const CData2DKvf& quantity) { return quantity.Kind().className == kParticleNumbers.className; }
+
 void MakeParticleValues(CYbSEKvfBase& layer) {
   // Rules are shared by all layers, of which there may be many.
   static const Condition kNumbers = ParticlesTracked() && Component(&CModelCompKvf::WQ) &&

@@ -37,6 +37,9 @@ class CRegLensePTListKvf : public CYbSEKvfListBase<CRegLensePTItemKvf> {
 };
 inline constexpr ImportantName<CRegLensePTListKvf> kRegistrationLenses{"REGISTRATION_LENSES"};
 
+/// The quantity is the number of particles at the begin in the cells of a computational layer.
+bool IsParticleNumber(const CData2DKvf& quantity);
+
 /// Makes what particle tracking asks of a computational layer: numbers of particles, and codes of registration.
 void MakeParticleValues(CYbSEKvfBase& layer);
 

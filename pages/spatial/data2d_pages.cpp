@@ -2,6 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/spatial/data2d_pages.h"
 
+#include <limits>
+
+#include <fmt/format.h>
+
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/decay_rate.h"
 #include "pages/parts/file_controls.h"
@@ -9,6 +13,7 @@
 #include "pages/parts/plot_content.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
+#include "spatial/cell_totals.h"
 #include "spatial/data2d.h"
 #include "spatial/pages.h"
 
@@ -30,7 +35,15 @@ class CData2DDlg : public PageOf<CData2DKvf> {
  private:
   MapContent QuantityMap();
   MapContent Map();
+  void DescribeTotals(PageForm& form);
+  /// The adding up of what the quantity comes to; null where a total says nothing.
+  std::shared_ptr<Computed<CellTotalsResult>> Totals();
+  std::string TotalsNotice();
+  /// Layer by layer.
+  SeriesContent TotalsChart();
 
+  std::optional<CellTotals> totals_;  ///< As they were asked for last.
+  std::shared_ptr<Computed<CellTotalsResult>> sums_;
   GroundViews ground_{*this};
 };
 
@@ -60,6 +73,62 @@ MapContent CData2DDlg::Map() {
   MapContent map = QuantityMap();
   ground_.PutOn(map);
   return map;
+}
+
+std::shared_ptr<Computed<CellTotalsResult>> CData2DDlg::Totals() {
+  const TotalsOfQuantities* above = TotalsAbove(Node());
+  std::optional<CellTotals> now = above ? above->TotalsOf(Node()) : std::nullopt;
+  if (now == totals_) return sums_;
+  totals_ = std::move(now);
+  sums_ = nullptr;
+  if (totals_)
+    sums_ = std::make_shared<Computed<CellTotalsResult>>(
+        "Adding up the cells", [totals = *totals_](CellTotalsResult& result, ProgressPart progress) {
+          return AddUpCells(totals, progress, result);
+        });
+  return sums_;
+}
+
+std::string CData2DDlg::TotalsNotice() {
+  const auto sums = Totals();
+  if (!sums) return {};
+  // Nobody would come back to what is computed beside the window.
+  if (!Context().syncSoon) sums->Run();
+  if (!sums->IsDone()) return totals_->title + ": being added up";
+  return sums->Result() ? TotalsText(*totals_, *sums->Result())
+                        : fmt::format("{} is not known: {}", totals_->title, sums->Problem());
+}
+
+SeriesContent CData2DDlg::TotalsChart() {
+  SeriesContent chart;
+  chart.numbers = NumberAxis{"Layer", {}};
+  const auto sums = Totals();
+  const auto result = sums ? NowOrAwaited(sums, chart.awaited) : nullptr;
+  if (!result) return chart;
+  Series series;
+  series.name = totals_->title;
+  series.unit = totals_->unit;
+  series.isStepped = true;
+  for (std::size_t layer = 0; layer < result->layers.size(); ++layer) {
+    const bool isKnown = totals_->layers[layer].problem.empty();
+    const double sum = isKnown ? result->layers[layer].sum : std::numeric_limits<double>::quiet_NaN();
+    // A step from the middle of a layer's number to that of the next.
+    if (layer == 0) {
+      series.positions.push_back(0.5);
+      series.values.push_back(sum);
+    }
+    series.positions.push_back(static_cast<double>(layer) + 1.5);
+    series.values.push_back(sum);
+  }
+  chart.series.push_back(std::move(series));
+  return chart;
+}
+
+void CData2DDlg::DescribeTotals(PageForm& form) {
+  const TotalsOfQuantities* above = TotalsAbove(Node());
+  if (!above || !above->TotalsOf(Node())) return;
+  form.Notice([this] { return TotalsNotice(); });
+  form.Chart([this] { return TotalsChart(); }).Caption("Layer by layer");
 }
 
 void CData2DDlg::Describe(PageForm& form) {
@@ -130,6 +199,7 @@ void CData2DDlg::Describe(PageForm& form) {
   ground_.DescribeButtons(form, !isUniform);
   form.Map([this] { return Map(); }).ShownWhen(!isUniform);
   ground_.DescribeSection(form, !isUniform);
+  DescribeTotals(form);
 }
 
 }  // namespace
