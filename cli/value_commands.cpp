@@ -6,9 +6,11 @@
 
 #include <fmt/format.h>
 #include <fmt/ostream.h>
+#include <fmt/ranges.h>
 
 #include "cli/json.h"
 #include "cli/offers.h"
+#include "cli/repeated_key.h"
 #include "cli/setup_file.h"
 #include "cli/typed_value.h"
 #include "core/kvf_writer.h"
@@ -18,11 +20,27 @@
 
 namespace tervane {
 
+namespace {
+
+std::string JsonRepeated(const RepeatedKey& key, const std::vector<std::string>& values) {
+  return JsonObject({{"key", JsonQuoted(key.key)}, {"values", JsonArray(values)}});
+}
+
+}  // namespace
+
 int GetCommand(const std::string& file, const std::string& typed, bool json, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   PrintLoadReportHint(document, streams);
   const SetupPath path = ParseSetupPath(typed);
+  if (const auto repeated = FindRepeatedKey(document, path)) {
+    const std::vector<std::string> values = ValuesOf(WrittenSetup(document), document, *repeated);
+    if (json)
+      fmt::print(streams.out, "{}\n", JsonRepeated(*repeated, values));
+    else
+      fmt::print(streams.out, "{}\n", fmt::join(values, ", "));
+    return kDone;
+  }
   const CYbSEKvfBase* node = FindNodeOrReport(document, path, typed, streams);
   if (!node) return kCouldNot;
   const WrittenSetup written(document);
@@ -52,11 +70,32 @@ struct Change {
 /// The setup with a change; null, with a message, when it is refused.
 std::unique_ptr<CFlowModelDoc> Changed(CFlowModelDoc& document, const Change& change, const KeyReference& reference,
                                        Streams streams) {
-  const auto refuse = [&](std::string_view why) {
+  const auto refuse = [&](std::string_view why) -> std::unique_ptr<CFlowModelDoc> {
     fmt::print(streams.err, "{} = {}: {}\n", change.path, change.value, why);
     return nullptr;
   };
   const SetupPath path = ParseSetupPath(change.path);
+  const auto readAnew = [&](const WrittenSetup& written) -> std::unique_ptr<CFlowModelDoc> {
+    std::string text, error;
+    auto changed = std::make_unique<CFlowModelDoc>();
+    if (!WriteKvfText(written.File(), text, error)) return refuse(error);
+    if (!changed->OpenText(text, document.PathName())) return refuse(changed->Error());
+    return changed;
+  };
+  if (const auto repeated = FindRepeatedKey(document, path)) {
+    // The node takes one of the two.
+    for (const bool areNumbers : {true, false}) {
+      const WrittenSetup written(document);
+      if (!TakeValues(written, document, *repeated, change.value, areNumbers)) continue;
+      const std::vector<std::string> wanted = ValuesOf(written, document, *repeated);
+      auto changed = readAnew(written);
+      if (!changed) return nullptr;
+      if (ValuesOf(WrittenSetup(*changed), *changed, *repeated) != wanted) continue;
+      changed->Continue(document);
+      return changed;
+    }
+    return refuse("the setup does not take these values: texts, or whole numbers, separated by commas were expected");
+  }
   const CYbSEKvfBase* node = FindNodeOrReport(document, path, change.path, streams);
   if (!node) return nullptr;
 
@@ -70,10 +109,8 @@ std::unique_ptr<CFlowModelDoc> Changed(CFlowModelDoc& document, const Change& ch
   if (const std::string expected = TakeTyped(change.value, info, *section, *key); !expected.empty())
     return refuse(expected + " was expected");
   const std::string wanted = ComparedText(*key);
-  std::string text, error;
-  auto changed = std::make_unique<CFlowModelDoc>();
-  if (!WriteKvfText(written.File(), text, error)) return refuse(error);
-  if (!changed->OpenText(text, document.PathName())) return refuse(changed->Error());
+  auto changed = readAnew(written);
+  if (!changed) return nullptr;
   const WrittenSetup result(*changed);
   const CYbSEKvfBase* changedNode = FindNode(changed->Root(), path.steps);
   KvfSection* changedSection = changedNode ? result.SectionOf(*changedNode) : nullptr;

@@ -295,6 +295,64 @@ TEST_F(CommandLine, SetTakesWhatAPageTakesAndSeveralKeysOrNone) {
   EXPECT_EQ(ReadFile(file), before);
 }
 
+TEST_F(CommandLine, SetFillsValuesThatStandInASectionOfTheirOwn) {
+  folder.Write("a.tvd",
+               SetupText(14,
+                         "section Results_Post_Processing {\nsection PT_Reg_Extraction {\nYbSEKvfListItemCount = "
+                         "1\n}\nsection PT_Pathline_Extraction {\nYbSEKvfListItemCount = 1\n}\n}\n"));
+  const std::string job = "Results_Post_Processing/PT_Reg_Extraction/Extraction_1/";
+  const struct {
+    std::string path;
+    const char *typed, *got;
+  } cases[] = {{job + "WellNames:wellname", "North 3, 17", "\"North 3\", \"17\""},
+               {job + "WellNames:wellname", "17", "\"17\""},
+               {job + "SinkCodes:sinkcode", "0, 3", "0, 3"},
+               {"Results_Post_Processing/PT_Pathline_Extraction/Extraction_1/Particle_IDs:id", "17", "17"},
+               {job + "WellNames:wellname", "", ""}};
+  for (const auto& c : cases) {
+    const Outcome outcome = Tervane({"set", file, c.path, c.typed});
+    EXPECT_EQ(outcome.status, kDone) << outcome.err;
+    EXPECT_EQ(Tervane({"get", file, c.path}).out, c.got + std::string("\n"));
+  }
+  EXPECT_EQ(Json(Tervane({"get", file, job + "SinkCodes:sinkcode", "--json"}))["values"][1].GetInt(), 3);
+  const std::string before = ReadFile(file);
+  EXPECT_THAT(Tervane({"set", file, job + "SinkCodes:sinkcode", "0, River"}).err, HasSubstr("whole numbers"));
+  EXPECT_THAT(Tervane({"set", file, job + "SinkCode:sinkcode", "0"}).err, HasSubstr("there is no SinkCode here"));
+  EXPECT_EQ(ReadFile(file), before);
+}
+
+TEST_F(CommandLine, SetBindsWhatATemplateTakesFromTheModel) {
+  folder.Write("b.kinetra",
+               "target KINETRA_SETUP {\nsection FORCINGS {\nsection FORCING_1 {\nSYMBOL = \"light\"\n}\nsection "
+               "FORCING_2 {\nSYMBOL = \"temp\"\nBUILT_IN_ID = 55\n}\n}\n}\n");
+  Tervane({"new", file});
+  const std::string templates = "KinetraTemplateSpecification";
+  ASSERT_EQ(Tervane({"set", file, templates + ":TemplateFile_OL", "b.kinetra"}).status, kDone);
+  const std::string place = templates + "/OL_Forcings:Forcing#2";
+  const Outcome outcome = Tervane({"set", file, place, "temp, 2020, 2800"});
+  EXPECT_EQ(outcome.status, kDone) << outcome.err;
+  EXPECT_EQ(Tervane({"get", file, place}).out, "temp, 2020, 2800\n");
+  EXPECT_EQ(Tervane({"set", file, place, "unknown, 2020, 2800"}).status, kCouldNot);
+}
+
+TEST_F(CommandLine, CheckTellsWhatMendsAFinding) {
+  folder.Write("a.tvd", SetupText(14,
+                                  "section SimSpec {\nsection ModelComp {\nWQ = 1\n}\n}\nsection Species {\n"
+                                  "NumberOfSpecies = 1\n}\nsection Sources {\nNumberOfSources = 1\nsection Source_1 {\n"
+                                  "Species = \"gone\"\n}\n}\n"));
+  const rapidjson::Document json = Json(Tervane({"check", file, "--json"}));
+  for (const auto& finding : json["findings"].GetArray()) {
+    if (!finding.HasMember("mends")) continue;
+    const auto& mend = finding["mends"][0];
+    EXPECT_STREQ(mend["text"].GetString(), "Change Species to Species_1");
+    // They are made for `set`.
+    EXPECT_EQ(Tervane({"set", file, mend["path"].GetString(), mend["value"].GetString()}).status, kDone);
+    EXPECT_THAT(Tervane({"check", file}).out, Not(HasSubstr("names a species")));
+    return;
+  }
+  FAIL() << "no mends";
+}
+
 TEST_F(CommandLine, JsonTellsKeysAndPages) {
   Tervane({"new", file});
   const rapidjson::Document get = Json(Tervane({"get", file, "SimSpec:ModelType", "--json"}));
