@@ -88,6 +88,13 @@ void DescribeFilter(PageForm& form, const char* by, int& isBy, const char* all, 
   form.Table(table).EnabledWhen(alsoActive.IsAlways() ? listed : listed || alsoActive);
 }
 
+/// A date whose key holds the day alone.
+Control& Day(PageForm& form, const char* label, CYbDateTime& value) {
+  Control& date = form.Date(label, value);
+  date.text = [&value] { return value.Format("%Y/%m/%d"); };
+  return date;
+}
+
 void DescribeRegistrationExtraction(PageForm& form, CResultsPTRegExtractionItemKvf& n, CYbSEDlgBase& page) {
   form.Check("Create separate shape files for each extracted item", n.SeparateFilesCheck);
   form.Check("Additionally, create separate files for each numerical layer", n.SepatateLayerFilesCheck)
@@ -99,8 +106,8 @@ void DescribeRegistrationExtraction(PageForm& form, CResultsPTRegExtractionItemK
   form.Integer("Top layer", n.TopLayer).EnabledWhen(someLayers);
   form.Integer("Bottom layer", n.BottomLayer).Beside().EnabledWhen(someLayers);
   form.Check("Extract all release dates", n.AllRelDateExtractionCheck);
-  form.Date("Release dates between", n.StartDate).EnabledWhen(someDates);
-  form.Date("and", n.EndDate).Beside().EnabledWhen(someDates);
+  Day(form, "Release dates between", n.StartDate).EnabledWhen(someDates);
+  Day(form, "and", n.EndDate).Beside().EnabledWhen(someDates);
   form.Check("Extract all travel times", n.AllTrvTimesExtrCheck);
   form.Number("Extract travel times between", n.StartYear).EnabledWhen(someTimes);
   form.Number("and", n.EndYear).Beside().EnabledWhen(someTimes);

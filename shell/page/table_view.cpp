@@ -65,10 +65,16 @@ void TableView::MakeButtons() {
                  RowAction::MoveDown);
   message_ = new QLabel;
   message_->setWordWrap(true);
-  if (control_.table->IsShownOnly()) message_->hide();
   bar->addSpacing(theme.Scaled(12));
   bar->addWidget(message_, 1);
   static_cast<QVBoxLayout*>(layout())->addLayout(bar);
+  Tell({});
+}
+
+void TableView::Tell(const QString& text) {
+  message_->setText(text);
+  // Above a table without buttons it takes no room while there is nothing to say.
+  message_->setVisible(!text.isEmpty() || filter_ || control_.table->Allows(RowAction::Insert));
 }
 
 void TableView::MakeFilter() {
@@ -99,8 +105,7 @@ void TableView::ShowArrangement() {
   head.setSortIndicatorShown(sorted > 0);
   if (sorted > 0) head.setSortIndicator(sorted - 1, table.IsDescending() ? Qt::DescendingOrder : Qt::AscendingOrder);
   if (!table.FilterText().empty() || message_->text().isEmpty())
-    message_->setText(table.FilterText().empty() ? QString()
-                                                 : tr("%1 of %2").arg(table.RowCount()).arg(table.AllRows()));
+    Tell(table.FilterText().empty() ? QString() : tr("%1 of %2").arg(table.RowCount()).arg(table.AllRows()));
 }
 
 void TableView::MakeView() {
@@ -194,7 +199,7 @@ void TableView::Sync() {
   // What is only shown is chosen by the user alone.
   if (!control_.table->IsShownOnly()) FollowCurrentRow();
   isSyncing_ = false;
-  message_->clear();
+  Tell({});
   ShowArrangement();
   SyncButtons();
 }
@@ -324,7 +329,7 @@ void TableView::ClearCells() {
 }
 
 void TableView::ShowResult(const CellsResult& result, const QString& done) {
-  message_->setText(done);
+  Tell(done);
   if (result.refused == 0) return;
   page_.Outside().ShowMessage(FromQt(tr("These cells kept their values:")) + "\n\n" + result.Message(),
                               Host::Icon::Warning);

@@ -66,6 +66,8 @@ class TableView : public QWidget {
   bool TakeKey(const QKeyEvent& keys);
   /// Opens the list or the calendar of the current cell.
   void OpenList();
+  /// Says something above the table.
+  void Tell(const QString& text);
   void ShowResult(const CellsResult& result, const QString& done);
   void SyncButtons();
   /// As a column begins: of what is only shown as wide as its head and cells, else as it is declared.

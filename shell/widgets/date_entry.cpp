@@ -10,11 +10,12 @@ namespace tervane {
 
 namespace {
 
-QString DateFormat() { return "yyyy/MM/dd  HH:mm"; }
+/// Of a date with its time, or of a day alone.
+QString FormatOf(const QString& text) { return text.contains(':') ? "yyyy/MM/dd  HH:mm" : "yyyy/MM/dd"; }
 
 }  // namespace
 
-QDateTime DateOf(const QString& text) { return QDateTime::fromString(text, DateFormat()); }
+QDateTime DateOf(const QString& text) { return QDateTime::fromString(text, FormatOf(text)); }
 
 QString SteppedDate(const QString& text, int cursor, int by) {
   const QDateTime date = DateOf(text);
@@ -25,7 +26,7 @@ QString SteppedDate(const QString& text, int cursor, int by) {
                             : cursor <= 14 ? date.addSecs(3600 * by)
                                            : date.addSecs(60 * by);
   const bool isInRange = stepped.date().year() >= 1 && stepped.date().year() <= 9999;
-  return isInRange ? stepped.toString(DateFormat()) : text;
+  return isInRange ? stepped.toString(FormatOf(text)) : text;
 }
 
 QMenu* NewCalendarMenu(QWidget* parent, std::function<QString()> shown, std::function<void(const QString&)> choose) {
@@ -40,10 +41,11 @@ QMenu* NewCalendarMenu(QWidget* parent, std::function<QString()> shown, std::fun
     calendar->setFocus();
   });
   const auto take = [menu, shown, choose](const QDate& day) {
-    const QDateTime date = DateOf(shown());
+    const QString before = shown();
+    const QDateTime date = DateOf(before);
     const QTime time = date.isValid() ? date.time() : QTime(0, 0);
     menu->close();
-    choose(QDateTime(day, time).toString(DateFormat()));
+    choose(QDateTime(day, time).toString(FormatOf(date.isValid() ? before : QString(":"))));
   };
   QObject::connect(calendar, &QCalendarWidget::clicked, menu, take);
   QObject::connect(calendar, &QCalendarWidget::activated, menu, take);
