@@ -75,6 +75,10 @@ class TemplateView::Page : public CYbSEDlgBase {
   bool IsShown(Kind kind) const {
     return view_.shown_ == 0 || KinetraSections()[static_cast<std::size_t>(view_.shown_) - 1].kind == kind;
   }
+  /// The same for what stands back while all are shown, so that names and expressions have room.
+  std::function<bool()> WhenAlone(std::vector<Kind> kinds) const {
+    return [this, rule = When(std::move(kinds))] { return view_.shown_ != 0 && rule(); };
+  }
   /// A rule of a column that those kinds have.
   std::function<bool()> When(std::vector<Kind> kinds) const {
     return [this, kinds = std::move(kinds)] {
@@ -90,6 +94,7 @@ class TemplateView::Page : public CYbSEDlgBase {
 
   void DescribeTable(PageForm& form) {
     auto table = std::make_shared<TableOf<Item>>(std::make_shared<ArrangedRows<Item>>([this] { return Shown(); }));
+    table->ShowOnly();
     table->Value("Kind", [](const Item& item) { return std::string(SectionOf(item.kind).name); })
         .Width(115)
         .ShownWhen([this] { return view_.shown_ == 0; });
@@ -104,7 +109,8 @@ class TemplateView::Page : public CYbSEDlgBase {
       return item.description;
     });
     table->Value("Unit", [](const Item& item) { return item.unitText; }).Width(70);
-    const auto hasValue = When({Kind::StateVariable, Kind::Constant, Kind::Forcing});
+    const std::vector<Kind> values{Kind::StateVariable, Kind::Constant, Kind::Forcing};
+    const auto hasValue = When(values), hasRange = WhenAlone(values);
     table->Value("Default", [](const Item& item) { return NumberOf(item, item.defaultValue); })
         .Width(70)
         .Format("%.6g")
@@ -112,11 +118,11 @@ class TemplateView::Page : public CYbSEDlgBase {
     table->Value("Minimum", [](const Item& item) { return NumberOf(item, item.minimum, item.minimum <= item.maximum); })
         .Width(70)
         .Format("%.6g")
-        .ShownWhen(hasValue);
+        .ShownWhen(hasRange);
     table->Value("Maximum", [](const Item& item) { return NumberOf(item, item.maximum, item.minimum <= item.maximum); })
         .Width(70)
         .Format("%.6g")
-        .ShownWhen(hasValue);
+        .ShownWhen(hasRange);
     table->Value("Expression", [](const Item& item) { return item.expression; })
         .Width(320)
         .ToolTip("Of a state variable: how fast it changes")
@@ -128,9 +134,12 @@ class TemplateView::Page : public CYbSEDlgBase {
     table->Value("Type", [](const Item& item) { return item.typeText; })
         .Width(170)
         .ToolTip("How a state variable is transported, the type of a process, the format of an output")
-        .ShownWhen(When({Kind::StateVariable, Kind::Process, Kind::DerivedOutput}));
-    table->Value("Stored", [](const Item& item) { return std::string(item.isOutput ? "yes" : ""); }).Width(60);
-    table->Value("Scope", [](const Item& item) { return item.scope; }).Width(60);
+        .ShownWhen(WhenAlone({Kind::StateVariable, Kind::Process, Kind::DerivedOutput}));
+    const auto isOneKind = [this] { return view_.shown_ != 0; };
+    table->Value("Stored", [](const Item& item) { return std::string(item.isOutput ? "yes" : ""); })
+        .Width(60)
+        .ShownWhen(isOneKind);
+    table->Value("Scope", [](const Item& item) { return item.scope; }).Width(60).ShownWhen(isOneKind);
     form.Table(table);
   }
 

@@ -12,6 +12,7 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QMenu>
+#include <QRegularExpression>
 #include <QToolButton>
 #include <algorithm>
 
@@ -439,6 +440,16 @@ int TableView::WidthOf(int column) const {
   return std::min(width + padding, 2 * declared);
 }
 
+int TableView::WidthOfHeadWords(int column) const {
+  QFont bold = view_->font();
+  bold.setBold(true);
+  const QFontMetrics metrics(bold);
+  int widest = 0;
+  for (const QString& word : ToQt(control_.table->Head(column)).split(QRegularExpression("\\s"), Qt::SkipEmptyParts))
+    widest = std::max(widest, metrics.horizontalAdvance(word));
+  return widest + Theme::Get().Scaled(10);
+}
+
 int TableView::WidthOfColumns() const {
   // A table that makes its columns later needs its room.
   if (model_->columnCount() == 0) return Theme::Get().Scaled(kTableWidth);
@@ -479,7 +490,7 @@ void TableView::FitColumns() {
     const TableColumn& shown = *control_.table->Column(column + 1);
     const int width = WidthOf(column + 1);
     head.setSectionResizeMode(column, shown.IsButton() ? QHeaderView::Fixed : QHeaderView::Interactive);
-    const int smallest = std::min(Theme::Get().Scaled(75), width);
+    const int smallest = std::min(std::max(Theme::Get().Scaled(75), WidthOfHeadWords(column + 1)), width);
     head.resizeSection(column, shown.IsButton() ? width : std::max(smallest, std::min(width, widest)));
   }
   const TableColumn* last = control_.table->Column(model_->columnCount());

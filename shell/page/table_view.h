@@ -72,6 +72,8 @@ class TableView : public QWidget {
   void SyncButtons();
   /// As a column begins: of what is only shown as wide as its head and cells, else as it is declared.
   int WidthOf(int column) const;
+  /// In which no word of the head is cut, since a head breaks between words alone.
+  int WidthOfHeadWords(int column) const;
   /// Of all columns as they begin, with the edges of the table.
   int WidthOfColumns() const;
   void FitColumns();

@@ -184,7 +184,7 @@ TEST_F(EngineProgram, PutsConcentrationsSourcesAndLensesOnTheCellsUnderTheirOwne
   ASSERT_EQ(Run("/PP"), kEngineDone) << log;
   std::string report = test::ReadFile(ReportPath());
   for (const char* expected : {"Landfill: Horizontal Extent: 0.02 km2 in 2 cells", "4, inside: 0.02 km2",
-                               "2 kg/s, constant", "Aquifer: Initial Concentration, Salt: 0 "})
+                               "2 g/s, constant", "Aquifer, Initial Concentration: Salt: 0 "})
     EXPECT_THAT(report, HasSubstr(expected));
   EXPECT_THAT(log, Not(HasSubstr("have no Horizontal")));  // a source is where it is
 

@@ -87,8 +87,7 @@ TEST(TemplateView, FollowsTheDiskAndTellsWhatIsWrong) {
   {
     Shown shown(view);
     ASSERT_EQ(shown.Table().RowCount(), 1);
-    // Without a range, and with a value that the user gives.
-    EXPECT_EQ(shown.Table().CopyText({1, 1, 1, 8}), "Constant\tk\t\t\t0.5\t\t\t\n");
+    EXPECT_EQ(shown.Table().CopyText({1, 1, 1, 7}), "Constant\tk\t\t-\t0.5\t\tuser\n");
   }
   folder.Write("a.kinetra", "target OTHER {\n}\n");
   EXPECT_TRUE(view.Reopen());

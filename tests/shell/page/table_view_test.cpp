@@ -7,6 +7,7 @@
 #include <QComboBox>
 #include <QCompleter>
 #include <QHeaderView>
+#include <QRegularExpression>
 #include <QTableView>
 #include <QToolButton>
 #include <algorithm>
@@ -202,6 +203,22 @@ class ShownTable {
   TableView* table_;
   QTableView* cells_;
 };
+
+TEST(TableView, ATableThatIsOnlyReadHasNoStripAboveItAndNoCutHeads) {
+  test::OpenedSetup setup(
+      "section SimSpec {\nsection ModelComp {\nWQ = 1\n}\n}\nsection Species {\nNumberOfSpecies = 2\n}\n", {900, 700});
+  setup.GoTo("Species");
+  const auto tables = setup.Frame().findChildren<TableView*>();
+  ASSERT_EQ(tables.size(), 2);
+  QTableView* matrix = tables.back()->findChild<QTableView*>();
+  EXPECT_EQ(matrix->y(), 0);
+  EXPECT_GT(tables.front()->findChild<QTableView*>()->y(), 0) << "one with buttons has them";
+  const QFontMetrics metrics(matrix->font());
+  for (int column = 0; column < matrix->model()->columnCount(); ++column)
+    for (const QString& word :
+         matrix->model()->headerData(column, Qt::Horizontal).toString().split(QRegularExpression("\\s")))
+      EXPECT_LT(metrics.horizontalAdvance(word), matrix->columnWidth(column)) << FromQt(word);
+}
 
 TEST(TableView, KeysGoOnAsInASpreadsheet) {
   using Cell = std::pair<int, int>;
