@@ -194,7 +194,7 @@ class BoundaryBuilder {
       return building_.Fail(boundary, read.error);
     for (std::size_t place = 0; place < cells.zones.size(); ++place) {
       const Zone& zone = *cells.zones[place];
-      const std::string name = fmt::format("{}_{}", zone.GetTitle(), layer_ + 1);
+      const std::string name = fmt::format("{}_{}", zone.GetStationName(), layer_ + 1);
       if (zone.BoundaryType == Zone::kFixedHead) {
         if (!AddHeads(zone, zone, EntriesOf(heads_.package, name, cells.zoneOfCell, static_cast<int>(place))))
           return false;

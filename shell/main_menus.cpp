@@ -23,6 +23,7 @@
 #include "document/view_settings.h"
 #include "execution/engine_search.h"
 #include "execution/execute_flags.h"
+#include "pages/document/modflow6_command.h"
 #include "shell/compare_view.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
@@ -133,6 +134,8 @@ void MainWindow::BuildMenus() {
   AddForDocument(file, tr("&What will be saved…"), nullptr, QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_S),
                  [this](DocumentFrame& frame) { ShowChanges(frame); });
   AddForDocument(file, tr("Com&pare With…"), nullptr, {}, [this](DocumentFrame& frame) { Compare(frame); });
+  AddForDocument(file, tr("&Export as MODFLOW 6…"), nullptr, {},
+                 [this](DocumentFrame& frame) { ExportToModflow6(frame.Session().Document(), host_); });
   file->addSeparator();
   Command& closeTab =
       Add(file, tr("&Close"), nullptr, QKeySequence::Close, [this] { CloseTab(tabs_->currentWidget()); });

@@ -16,10 +16,12 @@
 #include "spatial/domain.h"
 #include "spatial/series_totals.h"
 #include "subsurface/geology.h"
+#include "subsurface/internal_boundary.h"
 #include "subsurface/saturated_zone.h"
 #include "subsurface/wells.h"
 #include "tests/modflow6/model_reader.h"
 #include "tests/simspec/test_setup.h"
+#include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane::modflow6_export_test {
@@ -165,6 +167,122 @@ TEST(Modflow6Export, EnginesAndOptionsDecideWhatIsWritten) {
   const ModelReader thin = rhone.Exported("thin", {.thinCells = ModelLayers::ThinCells::Vanish});
   EXPECT_EQ(thin.At("IDOMAIN/1", 53, 46), -1);
   EXPECT_TRUE(thin.IsActive(3, 53, 46));
+}
+
+/// Six by five cells of 100 m, flat at 100 m, whose outer cells are the boundary; two layers of 20 and 30 m.
+class Box {
+ public:
+  explicit Box(const std::string& layers, const std::string& zone = "") : setup(Sections(layers, zone)) {
+    GridGeometry geometry;
+    geometry.nx = 6, geometry.ny = 5, geometry.cellSize = 100;
+    std::vector<float> domain(30, 2.0F), zones(30, kUsualDeleteValue), units(30, 1.0F);
+    for (int j = 1; j < 4; ++j)
+      for (int i = 1; i < 5; ++i) domain[static_cast<std::size_t>(6 * j + i)] = 1;
+    zones[6 * 1 + 2] = zones[6 * 1 + 3] = 7;
+    zones[6 * 2 + 2] = 8;
+    zones[6 * 3 + 2] = 9;
+    units[6 * 2 + 4] = 2;
+    test::WriteGrid(folder.File("domain.nds2"), geometry, domain, quantity::kCode);
+    test::WriteGrid(folder.File("zones.nds2"), geometry, zones, quantity::kCode);
+    test::WriteGrid(folder.File("units.nds2"), geometry, units, quantity::kCode);
+    setup.Root().Important(kDomain)->GridFile().Choose(FileName(folder.File("domain.nds2"), {}));
+  }
+
+  /// The lines of a package in a period, as `layer row column value ...`.
+  static std::vector<std::string> Lines(const ModelReader& model, const std::string& package, int period = 1) {
+    std::vector<std::string> lines;
+    if (!model.stresses.contains(package)) return lines;
+    for (const ModelReader::Row& entry : model.stresses.at(package).at(period)) {
+      lines.emplace_back();
+      for (const std::string& word : entry) lines.back() += (lines.back().empty() ? "" : " ") + word;
+    }
+    return lines;
+  }
+  ModelReader Exported() {
+    ExportReport report;
+    TestLog log;
+    const FileResult result = ExportModflow6(setup.Root(), "box", folder.File("model"), {.force = true}, log, report);
+    EXPECT_EQ(result.error, "");
+    return ModelReader(folder.File("model"));
+  }
+
+  test::TempFolder folder;
+  test::TestSetup setup;
+
+ private:
+  static std::string Sections(const std::string& layers, const std::string& zone) {
+    return "section SimSpec {\n ModelType = 2\n}\nsection Topography {\n FixedValue = 100.0f\n}\n"
+           "section SaturatedZone {\n TypeOfVerDiscr = 2\n" +
+           zone +
+           "section CompLayersSZ {\n NumberOfLayers = 2\n"
+           "section Layer_1 {\n section LowerLevel {\n FixedValue = 80.0f\n}\n" +
+           layers + "}\nsection Layer_2 {\n section LowerLevel {\n FixedValue = 50.0f\n}\n}\n}\n}\n";
+  }
+};
+
+std::string Segment(int number, double x, double y, const std::string& keys) {
+  return fmt::format("section OuterBoundaryProp_{} {{\n Name = \"S{}\"\n X = {:.1f}\n Y = {:.1f}\n {}\n}}\n", number,
+                     number, x, y, keys);
+}
+
+TEST(Modflow6Export, EachKindOfBoundaryBecomesItsPackage) {
+  // From the north-western corner clockwise: a head along the north, a flux in the east, a gradient in the south.
+  Box box("section OuterBoundary {\n NumberOfBoundaryConditions = 4\n" +
+          Segment(1, 50, 450, "BoundaryType = 1\nType = 1\nFixedValue = 95.0f") +
+          Segment(2, 550, 450, "BoundaryType = 2\nType = 1\nFixedValue = 0.004f") +
+          Segment(3, 550, 50, "BoundaryType = 3\nType = 1\nFixedValue = 0.01f") +
+          Segment(4, 50, 50, "BoundaryType = 0") + "}\n");
+  const ModelReader model = box.Exported();
+  EXPECT_THAT(Box::Lines(model, "chd"), testing::ElementsAre("1 1 1 95 S1_1", "1 1 2 95 S1_1", "1 1 3 95 S1_1",
+                                                             "1 1 4 95 S1_1", "1 1 5 95 S1_1"));
+  const std::vector<std::string> rates = Box::Lines(model, "flux");
+  // 0.004 m3/s over four cells; 0.01 times 1e-4 m/s in 20 m by 100 m, for each of five.
+  ASSERT_EQ(rates.size(), 9U);
+  EXPECT_EQ(rates.front().substr(0, 14), "1 5 2 17.28000") << rates.front();
+}
+
+TEST(Modflow6Export, ZonesInsideALayerBecomeTheirPackages) {
+  const auto zone = [](int code, const std::string& keys) {
+    return fmt::format("section InternalBoundaryProp {{\n GridCode = \"{}\"\n ID = \"Z{}\"\n{}\n}}\n", code, code,
+                       keys);
+  };
+  Box box("section InternalBoundary {\n Type = 1\n NoInternalBoundaries = 3\n" +
+          zone(7,
+               "BoundaryType = 3\nType = 1\nFixedValue = 90.0f\nHeadControlLeakage = 0\n"
+               "section Conductance {\n FixedValue = 0.5f\n}\n") +
+          zone(8, "BoundaryType = 6\n") + zone(9, "BoundaryType = 1\nType = 1\nFixedValue = 85.0f\n") + "}\n");
+  auto& boundary = box.setup.At<CSZVerDiscrInternalBoundaryKvf>("SaturatedZone/CompLayersSZ/Layer_1/InternalBoundary");
+  boundary.GridFile().Choose(FileName(box.folder.File("zones.nds2"), {}));
+  const ModelReader model = box.Exported();
+  // A half of 0.5 m2/s each.
+  EXPECT_THAT(Box::Lines(model, "ghb"), testing::ElementsAre("1 4 3 90 21600 Z7_1", "1 4 4 90 21600 Z7_1"));
+  EXPECT_THAT(Box::Lines(model, "chd"), testing::ElementsAre("1 2 3 85 Z9_1"));
+  EXPECT_EQ(model.At("IDOMAIN/1", 3, 3), 0);
+  EXPECT_EQ(model.At("IDOMAIN/2", 3, 3), 1);
+}
+
+TEST(Modflow6Export, UnitsLevelsAndRewettingReachTheCells) {
+  // One geological layer down to 70 m, of two units; below it the same goes on.
+  Box box(
+      "section WettingThreshold {\n FixedValue = -0.1f\n}\n",
+      "Threshold = 1\nTypeOfGeoParaDistribution = 1\n"
+      "section GeoUnitsSZProperties {\n NumberOfGeoUnits = 2\n"
+      "section GeoUnit_1 {\n SoilCode = 1\n HorConduc = 0.001f\n VerConduc = 0.0001f\n}\n"
+      "section GeoUnit_2 {\n SoilCode = 2\n HorConduc = 0.01f\n VerConduc = 0.001f\n}\n}\n"
+      "section GeoLayersSZ {\n NumberOfLayers = 1\nsection Layer_1 {\n section LowerLevel {\n FixedValue = 70.0f\n}\n"
+      "section HorizontalAnisotropyRatio {\n FixedValue = 0.5f\n}\n}\n}\n");
+  CData2DKvf& units = box.setup.At<CData2DKvf>("SaturatedZone/GeoLayersSZ/Layer_1/GeoUnit");
+  units.Type = CData2DKvf::kGridFile;
+  units.GridFile().Choose(FileName(box.folder.File("units.nds2"), {}));
+  const ModelReader model = box.Exported();
+  EXPECT_NEAR(model.At("K/1", 3, 5), 864, 1e-3);
+  EXPECT_NEAR(model.At("K/2", 3, 5), 864, 1e-3);
+  EXPECT_NEAR(model.At("K/1", 3, 4), 86.4, 1e-3);
+  EXPECT_NEAR(model.At("K33/2", 3, 4), 8.64, 1e-3);
+  EXPECT_EQ(model.At("K22/1", 1, 1), 0.5);
+  EXPECT_TRUE(model.Options("NPF6").contains("K22OVERK"));
+  EXPECT_TRUE(model.Options("NPF6").contains("REWET"));
+  EXPECT_NEAR(model.At("WETDRY/1", 1, 1), -0.1, 1e-6);
 }
 
 TEST(Modflow6Export, WhatIsNoModelIsRefusedAndTheFolderStaysAsItWas) {
