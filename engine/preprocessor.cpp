@@ -11,6 +11,7 @@
 #include "data/datafile.h"
 #include "data/datafile_request.h"
 #include "data/grid_files.h"
+#include "engine/modflow_report.h"
 #include "geometry/grid_polygons.h"
 #include "geometry/shapes.h"
 #include "platform/item_types.h"
@@ -30,6 +31,7 @@
 #include "subsurface/computational_layers.h"
 #include "subsurface/saturated_zone.h"
 #include "subsurface/wells.h"
+#include "surface/stress_period_grids.h"
 #include "surface/vegetation.h"
 #include "wqpt/extent.h"
 
@@ -199,6 +201,12 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
     ShowLayers(page);
   } else if (const auto* layer = dynamic_cast<const CSZVerDiscrLayerKvf*>(&node)) {
     ShowBoundaries(*layer, page);
+  } else if (const auto* periods = dynamic_cast<const CStressPeriodsKvf*>(&node)) {
+    page.ShowText(StressPeriodsText(*periods));
+  } else if (const auto* output = dynamic_cast<const COutputModKvf*>(&node)) {
+    page.ShowText(PackagesText(*output));
+  } else if (const auto* spans = dynamic_cast<const CRechargeAndPondingModListKvf*>(&node)) {
+    page.ShowText(SpansText(*spans));
   } else if (const auto* wells = dynamic_cast<const CSZWellKvf*>(&node)) {
     ShowWells(*wells, page);
   } else if (auto* quantity = dynamic_cast<CData2DKvf*>(&node)) {

@@ -128,6 +128,13 @@ CellsResult CYbSEDlgBase::FillDown(const Control& table, const CellRange& cells)
   return result;
 }
 
+CellsResult CYbSEDlgBase::FillAll(const Control& table, const CellRange& cells) {
+  if (!table.IsEnabled()) return {};
+  CellsResult result = table.table->FillAll(cells);
+  CommitTableChange(result.hint, table.table->ToAllRowsCommand());
+  return result;
+}
+
 CellsResult CYbSEDlgBase::ClearCells(const Control& table, const CellRange& cells) {
   if (!table.IsEnabled()) return {};
   CellsResult result = table.table->Clear(cells);

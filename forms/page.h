@@ -88,6 +88,7 @@ class CYbSEDlgBase {
   bool ChangeRow(const Control& table, RowAction action, int row);
   CellsResult Paste(const Control& table, const CellRange& selected, std::string_view text);
   CellsResult FillDown(const Control& table, const CellRange& cells);
+  CellsResult FillAll(const Control& table, const CellRange& cells);
   CellsResult ClearCells(const Control& table, const CellRange& cells);
 
   void UpdateDoc(int hint, const std::string& action, const void* source = nullptr) const;

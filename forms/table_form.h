@@ -95,6 +95,8 @@ class TableForm {
   /// What a row is called in the names of actions: "Parameter" gives "Insert Parameter", "Delete 3 Parameters".
   /// `many` is said where an s does not make the plural.
   void ItemName(std::string one, std::string many = {});
+  /// The cells of a row can be written into all rows, by a command of that name: "Apply to All Periods".
+  void OfferToAllRows(std::string command) { toAllRows_ = std::move(command); }
   /// Nothing can be changed: the rows are made by the page.
   void ShowOnly() { isShownOnly_ = true; }
   /// Cells can be changed, but no rows come, go or move.
@@ -119,6 +121,8 @@ class TableForm {
   int ColumnCount() const { return static_cast<int>(shown_.size()); }
   /// A column that is there; null for other numbers.
   const TableColumn* Column(int column) const;
+  /// Empty where no such command is offered.
+  const std::string& ToAllRowsCommand() const { return toAllRows_; }
   /// All columns, also those that are absent now.
   const std::deque<TableColumn>& Columns() const { return columns_; }
   bool IsShownOnly() const { return isShownOnly_; }
@@ -201,6 +205,8 @@ class TableForm {
   CellsResult Paste(const CellRange& selected, std::string_view text);
   /// Writes the cells of the first row into those below them, but in columns that are computed.
   CellsResult FillDown(const CellRange& cells);
+  /// Writes the cells of the first row into those of all other rows.
+  CellsResult FillAll(const CellRange& cells);
   /// Empties texts and file names; cells that have no empty value or cannot be changed are left alone.
   CellsResult Clear(const CellRange& cells);
 
@@ -254,6 +260,7 @@ class TableForm {
   std::string itemName_ = "Row", itemNames_ = "Rows";
   bool isShownOnly_ = false, keepsRows_ = false, keepsOrder_ = false;
   std::function<std::string(int)> rowHead_;
+  std::string toAllRows_;
   std::function<void(int)> chosen_;
   bool reportsCurrent_ = false;
   const TableColumn* sortedBy_ = nullptr;

@@ -204,6 +204,16 @@ CellsResult TableForm::FillDown(const CellRange& cells) {
   return result;
 }
 
+CellsResult TableForm::FillAll(const CellRange& cells) {
+  CellsResult result;
+  result.cells = cells;
+  if (!IsThere(cells.firstRow)) return result;
+  for (int row = 1; row <= RowCount(); ++row)
+    for (int column = std::max(cells.firstColumn, 1); column <= std::min(cells.lastColumn, ColumnCount()); ++column)
+      if (row != cells.firstRow && Column(column)->set) PutCopy(result, row, column, cells.firstRow);
+  return result;
+}
+
 CellsResult TableForm::Clear(const CellRange& cells) {
   CellsResult result;
   result.cells = cells;

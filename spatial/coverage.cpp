@@ -128,6 +128,7 @@ class CoverageBuilder {
       else if (board_.domain)
         board_.checks.push_back({check, FindingsInCells(check.check, *board_.domain, progress_.Part(done / parts, 1))});
     }
+    for (const CoverageSpans& spans : board_.request.spans) LookForSpans(spans);
     LeaveIfCancelled();
     progress_.Report(1);
     return std::move(board_);
@@ -149,6 +150,8 @@ class CoverageBuilder {
   void ReadPoints(CoverageRow& row);
   void LookForCells(CoverageRow& row);
   void TakeMissing(CoverageRow& row, const std::vector<bool>& isMissing);
+  std::string StressPeriodsText(const CoverageRow& row) const;
+  void LookForSpans(const CoverageSpans& spans);
   void Conclude(CoverageRow& row);
 
   ForcingTotals MakeForcing(const CoverageForcing& forcing);
@@ -318,6 +321,37 @@ void CoverageBuilder::TakeMissing(CoverageRow& row, const std::vector<bool>& isM
     row.missingCells = std::move(grid);
 }
 
+/// Which stress periods have times without values; empty where none has.
+std::string CoverageBuilder::StressPeriodsText(const CoverageRow& row) const {
+  if (!row.problem.empty() || !row.period || !row.file.use.isOverTime) return {};
+  std::size_t count = 0, first = 0, gap = 0;
+  const std::vector<TimeSpan>& periods = board_.request.stressPeriods;
+  for (std::size_t i = 0; i < periods.size(); ++i) {
+    // Both ascend.
+    while (gap < row.gaps.size() && row.gaps[gap].end <= periods[i].start) ++gap;
+    const bool hasGap = gap < row.gaps.size() && row.gaps[gap].start < periods[i].end;
+    if (!hasGap && periods[i].start >= row.period->start && periods[i].end <= row.period->end) continue;
+    if (count++ == 0) first = i;
+  }
+  if (count == 0) return {};
+  return fmt::format("{} of {} stress periods have times without values, the first is period {} from {} to {}", count,
+                     periods.size(), first + 1, DateInWords(DateAt(periods[first].start)),
+                     DateInWords(DateAt(periods[first].end)));
+}
+
+void CoverageBuilder::LookForSpans(const CoverageSpans& spans) {
+  const int periods = static_cast<int>(board_.request.stressPeriods.size());
+  if (periods == 0) return;
+  const int end = spans.ends.empty() ? 0 : *std::ranges::max_element(spans.ends);
+  if (end >= periods) return;
+  board_.spans.push_back(
+      {Severity::Warning,
+       fmt::format("{}: no values for stress period{} {}", spans.title, end + 1 == periods ? "" : "s",
+                   end + 1 == periods ? fmt::format("{}", periods) : fmt::format("{} to {}", end + 1, periods)),
+       {},
+       {}});
+}
+
 void CoverageBuilder::Conclude(CoverageRow& row) {
   const auto add = [&](Severity severity, std::string text) {
     row.remarks.push_back({severity, std::move(text), {}, {}});
@@ -333,6 +367,7 @@ void CoverageBuilder::Conclude(CoverageRow& row) {
     add(Severity::Warning, fmt::format("No values from {} to {}", DateInWords(DateAt(row.gaps[i].start)),
                                        DateInWords(DateAt(row.gaps[i].end))));
   if (row.gaps.size() > kMostGaps) add(Severity::Warning, fmt::format("And {} gaps more", row.gaps.size() - kMostGaps));
+  if (std::string text = StressPeriodsText(row); !text.empty()) add(Severity::Warning, std::move(text));
   if (std::string missing = MissingCellsText(row); !missing.empty()) add(Severity::Warning, std::move(missing));
   std::ranges::stable_sort(row.remarks, {}, &Finding::severity);
   row.state = CoverageState::Fine;

@@ -55,8 +55,18 @@ struct CoverageCheck {
   bool operator==(const CoverageCheck&) const = default;
 };
 
+/// A list of values for spans of stress periods.
+struct CoverageSpans {
+  std::string title;
+  std::vector<int> ends;  ///< The last period of each span.
+
+  bool operator==(const CoverageSpans&) const = default;
+};
+
 struct CoverageRequest {
-  std::optional<TimeSpan> simulation;  ///< Nothing while its dates are none.
+  std::optional<TimeSpan> simulation;   ///< Nothing while its dates are none.
+  std::vector<TimeSpan> stressPeriods;  ///< Into which an engine divides it, ascending; none where it does not.
+  std::vector<CoverageSpans> spans;
   DomainSource domain;
   std::vector<CoverageFile> files;
   std::vector<CoverageForcing> forcings;
@@ -145,6 +155,7 @@ struct CoverageBoard {
   std::vector<TotalsPeriod> periods;
   std::vector<ForcingTotals> forcings;
   std::vector<CoverageCheckResult> checks;
+  std::vector<Finding> spans;  ///< Stress periods without values.
 };
 
 /// Computes the board; what `previous` answers to the same question is taken from it. An error is "cancelled" alone.

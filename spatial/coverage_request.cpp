@@ -5,6 +5,7 @@
 #include "core/walked_node.h"
 #include "geometry/shapes.h"
 #include "simspec/periods.h"
+#include "simspec/stress_periods.h"
 #include "spatial/coverage.h"
 #include "spatial/data2d.h"
 #include "spatial/owner_titles.h"
@@ -34,6 +35,21 @@ std::optional<TimeSpan> SimulationOf(const CYbSEKvfBase& root) {
   const CYbDateTime start = period->GetSimStartDate(), end = period->SIMEND;
   if (!start.IsValid() || !end.IsValid() || end <= start) return std::nullopt;
   return TimeSpan{start.SecondsSinceEpoch(), end.SecondsSinceEpoch()};
+}
+
+std::vector<TimeSpan> StressPeriodsOf(CYbSEKvfBase& root) {
+  std::vector<TimeSpan> spans;
+  auto* periods = root.Important(kStressPeriods);
+  const std::optional<TimeSpan> simulation = SimulationOf(root);
+  if (!periods || !simulation || !periods->IsDataUsedInSetup()) return spans;
+  std::int64_t start = simulation->start;
+  for (const CYbDateTime& date : periods->GetDateMarkers()) {
+    // Dates in no order are told by the list itself.
+    if (!date.IsValid() || date.SecondsSinceEpoch() <= start) return {};
+    spans.push_back({start, date.SecondsSinceEpoch()});
+    start = spans.back().end;
+  }
+  return spans;
 }
 
 CoverageFile AskFile(const CYbSEKvfBase& node, const std::string& path, FileUse use) {
@@ -74,6 +90,8 @@ void AddRequestsBelow(const CYbSEKvfBase& node, WalkedNode& place, CoverageReque
     if (const auto* checker = dynamic_cast<const CellChecker*>(child))
       for (CellCheck& check : checker->CurrentChecks())
         request.checks.push_back({childPlace.Path(), child->Serial(), std::move(check)});
+    if (const auto* spans = dynamic_cast<const StressPeriodSpans*>(child))
+      request.spans.push_back({child->GetTitle(), spans->SpanEnds()});
     AddRequestsBelow(*child, childPlace, request);
   }
 }
@@ -83,6 +101,7 @@ void AddRequestsBelow(const CYbSEKvfBase& node, WalkedNode& place, CoverageReque
 CoverageRequest AskCoverage(CYbSEKvfBase& root) {
   CoverageRequest request;
   request.simulation = SimulationOf(root);
+  request.stressPeriods = StressPeriodsOf(root);
   request.domain = AskDomain(root);
   WalkedNode place(root);
   AddRequestsBelow(root, place, request);

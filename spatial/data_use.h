@@ -103,6 +103,14 @@ struct Forcing {
   bool operator==(const Forcing&) const = default;
 };
 
+/// A list whose items hold for spans of stress periods, each from behind the one before it.
+class StressPeriodSpans {
+ public:
+  virtual ~StressPeriodSpans() = default;
+  /// The last period of each span, in the order of the items.
+  virtual std::vector<int> SpanEnds() const = 0;
+};
+
 /// A node that holds one such quantity or more.
 class ForcingNode {
  public:

@@ -73,6 +73,12 @@ int CRechargeAndPondingModListKvf::StressPeriodCount() const {
   return periods ? periods->GetItemCount() : 0;
 }
 
+std::vector<int> CRechargeAndPondingModListKvf::SpanEnds() const {
+  std::vector<int> ends;
+  for (int number = 1; number <= GetItemCount(); ++number) ends.push_back(GetItem(number)->StressPeriodTo);
+  return ends;
+}
+
 int CRechargeAndPondingModListKvf::ValidateData() {
   const int periods = StressPeriodCount();
   bool isValid = true;

@@ -5,6 +5,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "core/list.h"
 #include "spatial/data2d.h"
@@ -52,7 +53,8 @@ class CRechargeAndPondingModItemKvf : public CData2DKvf {
 };
 
 /// The spans in the order of the stress periods; the last one reaches the last period. A list without spans passes.
-class CRechargeAndPondingModListKvf : public CYbSEKvfAbstractListBase<CRechargeAndPondingModItemKvf> {
+class CRechargeAndPondingModListKvf : public CYbSEKvfAbstractListBase<CRechargeAndPondingModItemKvf>,
+                                      public StressPeriodSpans {
  public:
   /// The kind is a constant.
   CRechargeAndPondingModListKvf(const StressPeriodGridsKind& kind, Condition takesPart, CYbSEKvfBase* parent);
@@ -60,6 +62,7 @@ class CRechargeAndPondingModListKvf : public CYbSEKvfAbstractListBase<CRechargeA
   std::unique_ptr<CRechargeAndPondingModItemKvf> NewItem() override;
   /// How many stress periods there are.
   int StressPeriodCount() const;
+  std::vector<int> SpanEnds() const override;
 
   /// Ends the last span with the last stress period.
   int ValidateData() override;

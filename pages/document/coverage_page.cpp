@@ -201,6 +201,8 @@ std::string CCoverageDlg::ChecksText() const {
   std::string text;
   for (const CoverageCheckResult& check : board_ ? board_->checks : std::vector<CoverageCheckResult>())
     for (const Finding& finding : check.findings) text += fmt::format("{}{}", text.empty() ? "" : "\n", finding.text);
+  for (const Finding& finding : board_ ? board_->spans : std::vector<Finding>())
+    text += fmt::format("{}{}", text.empty() ? "" : "\n", finding.text);
   return text;
 }
 

@@ -2,6 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/simspec/components_pages.h"
 
+#include <utility>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include "pages/simspec/engine_switch.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/conditions.h"
 #include "simspec/pages.h"
@@ -80,6 +86,9 @@ class CBasicParaDlg : public PageOf<CBasicParaKvf> {
   void Describe(PageForm& form) override;
 
  private:
+  /// Tells the user what another engine does not know; gives why the engine stays.
+  std::string WhyNotSwitch(int engine) const;
+
   int shown_ = 0;  ///< An engine that the list does not have keeps the form that was shown.
 };
 
@@ -88,9 +97,36 @@ void CBasicParaDlg::SetData() {
   if (engine >= kEngineTervane && engine <= kEngineModflow2000) shown_ = engine;
 }
 
+std::string CBasicParaDlg::WhyNotSwitch(int engine) const {
+  std::vector<std::string> unknown = UnknownToEngine(Node(), engine);
+  if (unknown.empty()) return {};
+  const std::string_view before = TextOf(kEngines, Node().ModelType);
+  constexpr std::size_t kMostLines = 12;
+  if (unknown.size() > kMostLines) {
+    const std::size_t more = unknown.size() - kMostLines;
+    unknown.resize(kMostLines);
+    unknown.push_back(fmt::format("and {} more", more));
+  }
+  const std::string question = fmt::format(
+      "{} does not know:\n\n  {}\n\nThese values stay in the setup and count again with {}. Switch the engine?",
+      TextOf(kEngines, engine), fmt::join(unknown, "\n  "), before);
+  if (Outside().Ask(question, Host::Icon::Question, Host::Buttons::YesNo) == Host::Answer::Yes) return {};
+  return fmt::format("the engine stays {}", before);
+}
+
 void CBasicParaDlg::Describe(PageForm& form) {
   CBasicParaKvf& n = Node();
-  form.Choice("Numeric Engine", n.ModelType).Hint(kTreeRebuilt).Revalidates();
+  Control& engines = form.Choice("Numeric Engine", n.ModelType).Hint(kTreeRebuilt).Revalidates();
+  engines.enter = [this, enter = engines.enter](const std::string& typed) {
+    CBasicParaKvf& basics = Node();
+    const int before = basics.ModelType;
+    std::string expected = enter(typed);
+    if (!expected.empty() || basics.ModelType == before) return expected;
+    const int engine = std::exchange(basics.ModelType, before);
+    expected = WhyNotSwitch(engine);
+    if (expected.empty()) basics.ModelType = engine;
+    return expected;
+  };
   std::vector<std::shared_ptr<PageForm>> forms{ModelCompForm(form, *n.Important(kModelComponents))};
   for (const int engine : {kEngineModflowSurfact, kEngineModflow96, kEngineModflow2000})
     forms.push_back(ModModelCompForm(form, *n.Important(kModflowComponents), engine));

@@ -142,6 +142,7 @@ double LengthOf(const Item& period) {
 std::shared_ptr<TableForm> PropertiesGrid(CStressPeriodsKvf& periods) {
   auto table = std::make_shared<TableOf<Item>>(periods);
   table->KeepRows();
+  table->OfferToAllRows("Apply to All Periods");
   const auto with = [&periods](std::vector<int> engines) {
     return [&periods, engines = std::move(engines)] {
       return std::ranges::find(engines, EngineOf(periods)) != engines.end();

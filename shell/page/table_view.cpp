@@ -147,6 +147,8 @@ void TableView::MakeActions() {
   action(tr("&Copy"), QKeySequence::Copy, &TableView::Copy);
   action(tr("&Paste"), QKeySequence::Paste, &TableView::Paste);
   action(tr("&Fill Down"), QKeySequence(Qt::CTRL | Qt::Key_D), &TableView::FillDown);
+  if (const std::string& toAll = control_.table->ToAllRowsCommand(); !toAll.empty())
+    action(Translated(toAll), QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_D), &TableView::FillAll);
   action(tr("C&lear"), QKeySequence(Qt::Key_Delete), &TableView::ClearCells);
 }
 
@@ -322,6 +324,13 @@ void TableView::FillDown() {
   const auto cells = Selected();
   if (!cells) return;
   const CellsResult result = page_.FillDown(control_, *cells);
+  ShowResult(result, tr("Cells filled: %1").arg(result.taken));
+}
+
+void TableView::FillAll() {
+  const auto cells = Selected();
+  if (!cells) return;
+  const CellsResult result = page_.FillAll(control_, *cells);
   ShowResult(result, tr("Cells filled: %1").arg(result.taken));
 }
 

@@ -32,6 +32,7 @@ class TableView : public QWidget {
   void Cut();
   void Paste();
   void FillDown();
+  void FillAll();
   void ClearCells();
   void ChangeRows(RowAction action);
   /// Selects a cell, counted from 1.

@@ -52,7 +52,11 @@ TEST(ModelComponents, TheyDecideWhichNodesTakePart) {
                                    "air => SimSpec/AirFlowSimulationParametersMod",
                                    "exchange => SimSpec/CompControlParaSZ/CompControlParaRivEx",
                                    "colloids => ModelCompWQ/ColloidControlPara",
-                                   "overview => Overview"};
+                                   "overview => Overview",
+                                   "periods => SimSpec/STRESSPERIODS",
+                                   "solver => SimSpec/CompControlParaModSZ",
+                                   "packages => SimSpec/CompControlParaModPackage",
+                                   "output => OutputModflow"};
   struct Case {
     const char* what;
     std::function<void(Choice)> choose;
@@ -83,11 +87,14 @@ TEST(ModelComponents, TheyDecideWhichNodesTakePart) {
        "own step ol uz sz trans colloids"},
       {"processes off", [](Choice c) { c.quality.ProcessType = 2; }, "own step ol uz sz trans"},
       {"Kinetra", [](Choice c) { c.quality.IncludeProcesses = c.quality.ProcessType = 1; }, "own step ol uz sz trans"},
-      {"Surfact", [](Choice c) { c.basics.ModelType = 1; }, "mod trans"},
-      {"Surfact with WQ", [](Choice c) { c.basics.ModelType = c.own.WQ = 1; }, "mod trans"},
-      {"Modflow 96", [](Choice c) { c.basics.ModelType = 2; }, "trans"},
-      {"Modflow 2000", [](Choice c) { c.basics.ModelType = 3; }, "trans"},
-      {"unknown engine", [](Choice c) { c.basics.ModelType = 4; }, "trans"}};
+      {"Surfact", [](Choice c) { c.basics.ModelType = 1; }, "mod trans periods solver packages output"},
+      {"Surfact with WQ", [](Choice c) { c.basics.ModelType = c.own.WQ = 1; },
+       "mod trans periods solver packages output"},
+      {"Modflow 96", [](Choice c) { c.basics.ModelType = 2; }, "trans periods solver packages output"},
+      {"Modflow 2000", [](Choice c) { c.basics.ModelType = 3; }, "trans periods solver packages output"},
+      {"Modflow without subsurface", [](Choice c) { c.basics.ModelType = 3, c.modflow.Subsurface = 0; },
+       "trans periods solver output"},
+      {"unknown engine", [](Choice c) { c.basics.ModelType = 4; }, "trans periods"}};
   for (const Case& c : cases) {
     TestSetup setup;
     c.choose(Choice(setup));

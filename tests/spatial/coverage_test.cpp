@@ -10,13 +10,17 @@
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "geometry/shapes.h"
+#include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
 #include "simspec/periods.h"
+#include "simspec/stress_periods.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "spatial/stations.h"
+#include "surface/climate.h"
 #include "surface/irrigation.h"
 #include "surface/land_use.h"
+#include "surface/stress_period_grids.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 #include "wqpt/sources.h"
@@ -206,6 +210,31 @@ TEST_F(Coverage, HoldsPeriodsAndGapsAgainstTheSimulation) {
     EXPECT_EQ(RowOf(*board, "rain.nds0").TimeText(), row.text);
     EXPECT_EQ(RowOf(*board, "rain.nds0").state, row.state) << row.text;
   }
+}
+
+TEST_F(Coverage, HoldsSeriesAndSpansAgainstStressPeriods) {
+  auto& root = document_.Root();
+  root.Important(kBasicParameters)->ModelType = kEngineModflowSurfact;
+  root.Important(kModflowComponents)->Recharge = 1;
+  root.Important(kClimate)->RechargeOption = CPrecipitationRelatedKvf::kGivenLayer;
+  root.Important(kStressPeriods)->MakePeriods({{2000, 8, 1}, {2000, 9, 1}, {2001, 1, 1}}, StressPeriodSteps());
+  // It ends with 2000, and its first month is missing.
+  WriteSeries("rain.nds0", {2000, 8, 1}, 153, {1});
+  Rain().Global().TYPE = CGlobalKvf::kTimeVarying;
+  Rain().Global().SeriesFile().Choose(FileName("rain.nds0", folder_.Path()));
+  const auto board = Board();
+  ASSERT_EQ(board->request.stressPeriods.size(), 4U);
+  std::vector<std::string> told;
+  for (const CoverageRow& row : board->rows)
+    for (const Finding& remark : row.remarks)
+      if (remark.text.find("stress periods") != std::string::npos) told.push_back(remark.text);
+  EXPECT_THAT(told, ElementsAre(HasSubstr("2 of 4 stress periods have times without values, the first is period 1")));
+  ASSERT_EQ(board->spans.size(), 1U);
+  EXPECT_EQ(board->spans[0].text, "Recharge Layer: no values for stress periods 1 to 4");
+  root.Important(kClimate)->Child<CRechargeAndPondingModListKvf>()->AddItem();
+  EXPECT_THAT(Board()->spans, IsEmpty());
+  root.Important(kBasicParameters)->ModelType = kEngineTervane;
+  EXPECT_THAT(Board()->request.stressPeriods, IsEmpty());
 }
 
 TEST_F(Coverage, WeighsStationsByTheirShareOfTheDomain) {

@@ -192,6 +192,11 @@ TEST_F(StressPeriodPage, TimeStepsAreWholeAndTellTheirLengths) {
   EXPECT_EQ(Cells().ShownCell(1, 5), "0.25");
   EXPECT_EQ(Cells().ShownCell(1, 6), "6.75");
   EXPECT_EQ(Find("Total:", ControlKind::Shown).Text(), "31 days in 3 periods with 6 time steps");
+  const CellRange steps{1, 2, 1, 3};
+  EXPECT_EQ(page->FillAll(Table(), steps).taken, 4);
+  EXPECT_EQ(periods.GetItem(3)->NSTP, 4);
+  EXPECT_EQ(periods.GetItem(2)->TSMULT, 3);
+  EXPECT_EQ(changes.back(), "Apply to All Periods");
   period.NSTP = 0;
   EXPECT_EQ(Cells().ShownCell(1, 5), "");
   ShowProperties(kEngineModflow2000);
