@@ -12,7 +12,7 @@ namespace tervane {
 
 namespace {
 
-constexpr int kMostLines = 1000;
+constexpr int kMostPeriods = 1000;
 
 std::string SourceText(const CData2DKvf& quantity) {
   const GridSource source = quantity.CurrentSource();
@@ -41,7 +41,7 @@ std::string StressPeriodsText(const CStressPeriodsKvf& periods) {
   const bool isAdaptive = EngineOf(periods) == kEngineModflowSurfact;
   std::string text = fmt::format("{} stress periods from {} on.\n", periods.GetItemCount(), periods.GetDateText(0));
   for (int number = 1; number <= periods.GetItemCount(); ++number) {
-    if (number > kMostLines) return text + fmt::format("and {} periods more\n", periods.GetItemCount() - kMostLines);
+    if (number > kMostPeriods) return text + fmt::format("and {} periods more\n", periods.GetItemCount() - kMostPeriods);
     const CStressPeriodsItemKvf& period = *periods.GetItem(number);
     const double days = periods.LengthOf(number).InDays();
     text += fmt::format("{} to {}: {} days", number, periods.GetDateText(number), FormatNumber(days, "%.6g"));
@@ -73,7 +73,7 @@ std::string PackagesText(const COutputModKvf& output) {
 std::string SpansText(const CRechargeAndPondingModListKvf& spans) {
   std::string text;
   for (int number = 1; number <= spans.GetItemCount(); ++number) {
-    if (number > kMostLines) return text + fmt::format("and {} spans more\n", spans.GetItemCount() - kMostLines);
+    if (number > kMostPeriods) return text + fmt::format("and {} spans more\n", spans.GetItemCount() - kMostPeriods);
     const CRechargeAndPondingModItemKvf& span = *spans.GetItem(number);
     text += fmt::format("Stress periods {} to {}, {}: {}\n", span.StressPeriodFrom(), span.StressPeriodTo,
                         span.DatesText(), SourceText(span));

@@ -87,6 +87,8 @@ bool BuildWells(Building& building);
 bool BuildDrains(Building& building);
 /// RCH
 bool BuildRecharge(Building& building);
+/// EVT, where an old file has brought what it needs.
+bool BuildEvapotranspiration(Building& building);
 /// IMS
 bool BuildSolver(Building& building);
 /// OC

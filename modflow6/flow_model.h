@@ -94,10 +94,14 @@ struct StressPackage {
 
 /// Rates over the area of the model (RCH, EVT), made period by period as they are written.
 struct AreaStress {
+  /// Values by cell that hold from that period (from 0) on.
+  using Spans = std::map<std::size_t, std::vector<float>>;
+
   bool isFixedToCell = false;  ///< Cells below take nothing in the place of one that is inactive.
   bool savesFlows = false;
-  /// Layers from 1 by cell, where they are not the uppermost: from that period on.
-  std::map<std::size_t, std::vector<float>> layers = {};
+  Spans layers = {};    ///< From 1; without them the uppermost.
+  Spans surfaces = {};  ///< Of EVT alone: elevations at which the rate is full.
+  Spans depths = {};    ///< Of EVT alone: below the surface, at which it ends.
   /// The rate by cell in metres a day. False in `isNew` for one that is as in the period before.
   std::function<FileResult(std::size_t period, std::vector<float>& rates, bool& isNew)> rates;
 };
@@ -129,7 +133,7 @@ struct FlowModel {
   bool hasStorage = true;
   std::optional<Rewetting> rewetting;
   std::vector<StressPackage> stresses;
-  std::optional<AreaStress> recharge;
+  std::optional<AreaStress> recharge, evapotranspiration;
   Solver solver;
   OutputControl output;
 

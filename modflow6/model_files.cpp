@@ -297,37 +297,47 @@ class ModelFiles {
   }
 
   std::string WriteRecharge() {
-    if (!model_.recharge) return {};
-    const AreaStress& recharge = *model_.recharge;
-    BlockText text = NewText("RCH");
+    return model_.recharge ? WriteArea("RCH", "RECHARGE", *model_.recharge) : std::string();
+  }
+  std::string WriteEvapotranspiration() {
+    return model_.evapotranspiration ? WriteArea("EVT", "RATE", *model_.evapotranspiration) : std::string();
+  }
+
+  std::string WriteArea(const std::string& type, const std::string& rateKeyword, const AreaStress& stress) {
+    const std::string extension = LowerCase(type);
+    BlockText text = NewText(type);
     text.Begin("OPTIONS");
     text.Line("READASARRAYS");
-    text.Line("FIXED_CELL", recharge.isFixedToCell);
-    text.Line("SAVE_FLOWS", recharge.savesFlows);
+    text.Line("FIXED_CELL", stress.isFixedToCell);
+    text.Line("SAVE_FLOWS", stress.savesFlows);
     text.End();
     std::vector<float> rates;
     for (std::size_t period = 0; period < model_.periods.size(); ++period) {
       bool isNew = true;
-      if (FileResult made = recharge.rates(period, rates, isNew); !made.Ok()) return made.error;
-      const auto layers = recharge.layers.find(period);
-      if (!isNew && layers == recharge.layers.end()) continue;
+      if (FileResult made = stress.rates(period, rates, isNew); !made.Ok()) return made.error;
       if (log_.IsCancelled()) return kCancelled;
+      std::vector<std::string> lines;
+      const auto add = [&]<class Number>(const std::string& keyword, const std::vector<float>& values, Number) {
+        lines.push_back(keyword);
+        lines.push_back("  " + arrays_.Add<Number>(fmt::format("{}_{}_{}", extension, LowerCase(keyword), period + 1),
+                                                   [&](std::size_t cell) { return values[cell]; }));
+      };
+      const auto addSpan = [&]<class Number>(const std::string& keyword, const AreaStress::Spans& spans,
+                                             Number number) {
+        if (const auto begins = spans.find(period); begins != spans.end()) add(keyword, begins->second, number);
+      };
+      addSpan(type == "RCH" ? "IRCH" : "IEVT", stress.layers, int{});
+      addSpan("SURFACE", stress.surfaces, double{});
+      if (isNew) add(rateKeyword, rates, double{});
+      addSpan("DEPTH", stress.depths, double{});
+      if (lines.empty()) continue;
       text.Begin(fmt::format("PERIOD {}", period + 1));
-      if (layers != recharge.layers.end()) {
-        text.Line("IRCH");
-        text.Line("  " + arrays_.Add<int>(fmt::format("irch_{}", period + 1),
-                                          [&](std::size_t cell) { return layers->second[cell]; }));
-      }
-      if (isNew) {
-        text.Line("RECHARGE");
-        text.Line("  " + arrays_.Add<double>(fmt::format("recharge_{}", period + 1),
-                                             [&](std::size_t cell) { return rates[cell]; }));
-      }
+      for (const std::string& line : lines) text.Line(line);
       text.End();
       if (!arrays_.Problem().empty()) return arrays_.Problem();
     }
-    Register("RCH", File("rch"), "rch");
-    return Put(File("rch"), text.Take());
+    Register(type, File(extension), extension);
+    return Put(File(extension), text.Take());
   }
 
   // ---- Solver, output, names

@@ -172,15 +172,19 @@ bool BuildOutput(Building& building) {
     if (item.DataTypeID == "WELL") saveFlowsOf("WEL");
     if (item.DataTypeID == "DRAIN") saveFlowsOf("DRN");
     if (item.DataTypeID == "RECHARGE" && building.model.recharge) building.model.recharge->savesFlows = isBinary;
+    if (item.DataTypeID == "EVAPOTRANSPIRATION" && building.model.evapotranspiration)
+      building.model.evapotranspiration->savesFlows = isBinary;
   }
   if (output->ModPath != 0) {
     control.savesHead = control.savesCellFlows = true;
     for (StressPackage& package : building.model.stresses) package.savesFlows = true;
-    if (building.model.recharge) building.model.recharge->savesFlows = true;
+    for (auto* area : {&building.model.recharge, &building.model.evapotranspiration})
+      if (*area) (*area)->savesFlows = true;
     building.Tell(Fate::Carried, *output, "heads and all flows are saved for tracking particles", "ModPath");
   }
   control.savesBudget =
       control.savesCellFlows || (building.model.recharge && building.model.recharge->savesFlows) ||
+      (building.model.evapotranspiration && building.model.evapotranspiration->savesFlows) ||
       std::ranges::any_of(building.model.stresses, [](const StressPackage& package) { return package.savesFlows; });
   return true;
 }

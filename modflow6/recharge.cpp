@@ -19,8 +19,8 @@ namespace tervane::modflow6 {
 
 namespace {
 
-/// Precipitation on the cells, period by period, in metres a day.
-struct Rain {
+/// A forcing on the cells, period by period.
+struct CellForcing {
   std::vector<std::vector<double>> means;  ///< Of each series over the periods.
   std::vector<int> seriesOfCell;           ///< Empty where one series serves all; below 0 where none does.
   std::optional<ForcingSeries> grids;
@@ -32,7 +32,7 @@ struct Rain {
   }
 };
 
-bool TakeRain(Building& building, const C2DStationBasedDataKvf& node, Rain& rain) {
+bool TakeForcing(Building& building, const C2DStationBasedDataKvf& node, CellForcing& rain) {
   const Forcing forcing = node.CurrentForcings().front();
   rain.grids = forcing.overGrid;
   if (rain.grids) return rain.grids->problem.empty() || building.Fail(node, rain.grids->problem);
@@ -62,91 +62,131 @@ bool TakeRain(Building& building, const C2DStationBasedDataKvf& node, Rain& rain
       ++without;
   }
   if (without > 0)
-    building.Tell(Fate::Changed, node, fmt::format("{} cells belong to no station: they get no recharge", without),
-                  "TYPE");
+    building.Tell(Fate::Changed, node, fmt::format("{} cells belong to no station: they get nothing", without), "TYPE");
   return true;
 }
 
-/// The layers to which recharge goes, where spans of periods tell them.
-bool TakeLayers(Building& building, const CPrecipitationRelatedKvf& climate, AreaStress& recharge) {
-  const CRechargeAndPondingModListKvf* list = nullptr;
-  for (CYbSEKvfBase* child = climate.GetFirstChild(); child; child = climate.GetNextChild(child))
-    if (child->GetSectionName() == kRechargeLayer.section)
-      list = dynamic_cast<const CRechargeAndPondingModListKvf*>(child);
-  if (!list) return true;
-  if (list->GetItemCount() == 0)
-    return building.Fail(*list, "recharge is to go to given layers, but there is no span of periods that gives them");
+/// The child that gives values for spans of periods; null where there is none.
+const CRechargeAndPondingModListKvf* SpansIn(const CYbSEKvfBase& owner, const StressPeriodGridsKind& kind) {
+  for (CYbSEKvfBase* child = owner.GetFirstChild(); child; child = owner.GetNextChild(child))
+    if (child->GetSectionName() == kind.section) return dynamic_cast<const CRechargeAndPondingModListKvf*>(child);
+  return nullptr;
+}
+
+bool TakeSpans(Building& building, const CRechargeAndPondingModListKvf& list, std::string_view becomes,
+               AreaStress::Spans& spans) {
   const auto lowest = static_cast<float>(building.model.layers.size());
-  for (int number = 1; number <= list->GetItemCount(); ++number) {
-    const CRechargeAndPondingModItemKvf& item = *list->GetItem(number);
-    LayerValues layers;
-    if (!building.Take(item, layers)) return false;
-    std::vector<float> whole(building.CellCount(), 1.0F);
+  for (int number = 1; number <= list.GetItemCount(); ++number) {
+    const CRechargeAndPondingModItemKvf& item = *list.GetItem(number);
+    std::vector<float> whole(building.CellCount(), item.IsCode() ? 1.0F : 0.0F);
+    LayerValues values;
+    if (item.HasRelativeToGround()) {
+      std::vector<float> elevations;
+      if (const std::string problem = ElevationsOn(building.domain, item, building.levels.Tops(0), elevations);
+          !problem.empty())
+        return building.Fail(item, problem);
+      values = LayerValues(std::move(elevations));
+    } else if (!building.Take(item, values)) {
+      return false;
+    }
     for (std::size_t cell = 0; cell < whole.size(); ++cell)
-      if (layers.At(cell) != kDeleteValue) whole[cell] = std::clamp(std::round(layers.At(cell)), 1.0F, lowest);
-    recharge.layers[static_cast<std::size_t>(std::max(1, item.StressPeriodFrom())) - 1] = std::move(whole);
-    building.Tell(Fate::Carried, item, "IRCH of RCH");
+      if (const float value = values.At(cell); value != kDeleteValue)
+        whole[cell] = item.IsCode() ? std::clamp(std::round(value), 1.0F, lowest) : value;
+    spans[static_cast<std::size_t>(std::max(1, item.StressPeriodFrom())) - 1] = std::move(whole);
+    building.Tell(Fate::Carried, item, std::string(becomes));
   }
-  building.Tell(Fate::Carried, climate, "recharge goes to given layers", "RechargeOption");
   return true;
+}
+
+/// The rates of a forcing times a factor by cell, in metres a day.
+auto RatesOf(const Building& building, CellForcing forcing, LayerValues factors) {
+  return [&building, forcing = std::move(forcing), factors = std::move(factors)](
+             std::size_t period, std::vector<float>& rates, bool& isNew) -> FileResult {
+    isNew = !forcing.IsSameAsBefore(period);
+    if (!isNew) return {};
+    rates.assign(building.CellCount(), 0.0F);
+    std::vector<float> grid;
+    if (forcing.grids) {
+      CTvn2DOrthoRotatedGridData mean;
+      if (FileResult made = building.series.MeanGrid(forcing.grids->path, forcing.grids->item, period, mean);
+          !made.Ok())
+        return made;
+      if (std::string problem = PutOnModel(mean, building.domain.Geometry(), false, grid); !problem.empty())
+        return {problem, {}};
+    }
+    for (std::size_t cell = 0; cell < rates.size(); ++cell) {
+      const int place = forcing.seriesOfCell.empty() ? 0 : forcing.seriesOfCell[cell];
+      if (place < 0 || factors.At(cell) == kDeleteValue || (forcing.grids && grid[cell] == kDeleteValue)) continue;
+      const double rate =
+          forcing.grids ? static_cast<double>(grid[cell]) : forcing.means[static_cast<std::size_t>(place)][period];
+      rates[cell] = static_cast<float>(rate * kSecondsOfDay * static_cast<double>(factors.At(cell)));
+    }
+    return {};
+  };
 }
 
 }  // namespace
 
 bool BuildRecharge(Building& building) {
   const auto& components = *building.root.Important(kModflowComponents);
-  if (components.ET != 0)
-    building.Tell(Fate::LeftOut, components,
-                  "the setup holds no surface and depth of evapotranspiration: there is no EVT", "ET");
   const auto* climate = building.root.Important(kClimate);
   const auto* precipitation = building.root.Important(kPrecipitation);
   if (components.Recharge == 0 || !climate || !precipitation) return true;
-  Rain rain;
-  if (!TakeRain(building, *precipitation, rain)) return false;
-  const CData2DKvf* fraction = PropertyOf(*climate, "RechargeFraction");
+  CellForcing rain;
+  if (!TakeForcing(building, *precipitation, rain)) return false;
   LayerValues fractions(1.0F);
-  if (fraction) {
+  if (const CData2DKvf* fraction = PropertyOf(*climate, "RechargeFraction")) {
     if (!building.Take(*fraction, fractions)) return false;
     building.Tell(Fate::Carried, *fraction, "a factor on the rates of RCH");
   }
   AreaStress recharge;
   recharge.isFixedToCell = climate->RechargeOption != CPrecipitationRelatedKvf::kHighestActiveCell;
-  if (climate->RechargeOption == CPrecipitationRelatedKvf::kGivenLayer) {
-    if (!TakeLayers(building, *climate, recharge)) return false;
-  } else {
-    building.Tell(
-        Fate::Carried, *climate,
-        recharge.isFixedToCell ? "recharge goes to the top layer alone" : "recharge goes to the highest active cell",
-        "RechargeOption");
+  std::string where =
+      recharge.isFixedToCell ? "recharge goes to the top layer alone" : "recharge goes to the highest active cell";
+  if (const auto* layers = SpansIn(*climate, kRechargeLayer);
+      layers && climate->RechargeOption == CPrecipitationRelatedKvf::kGivenLayer) {
+    if (layers->GetItemCount() == 0)
+      return building.Fail(*layers, "recharge is to go to given layers, but no span of periods gives them: add one");
+    if (!TakeSpans(building, *layers, "IRCH of RCH", recharge.layers)) return false;
+    where = "recharge goes to given layers";
   }
-  recharge.rates = [&building, rain = std::move(rain), fractions](std::size_t period, std::vector<float>& rates,
-                                                                  bool& isNew) -> FileResult {
-    isNew = !rain.IsSameAsBefore(period);
-    if (!isNew) return {};
-    rates.assign(building.CellCount(), 0.0F);
-    std::vector<float> grid;
-    if (rain.grids) {
-      CTvn2DOrthoRotatedGridData mean;
-      if (FileResult made = building.series.MeanGrid(rain.grids->path, rain.grids->item, period, mean); !made.Ok())
-        return made;
-      if (std::string problem = PutOnModel(mean, building.domain.Geometry(), false, grid); !problem.empty())
-        return {problem, {}};
-    }
-    for (std::size_t cell = 0; cell < rates.size(); ++cell) {
-      const int place = rain.seriesOfCell.empty() ? 0 : rain.seriesOfCell[cell];
-      if (place < 0 || fractions.At(cell) == kDeleteValue || (rain.grids && grid[cell] == kDeleteValue)) continue;
-      const double rate =
-          rain.grids ? static_cast<double>(grid[cell]) : rain.means[static_cast<std::size_t>(place)][period];
-      rates[cell] = static_cast<float>(rate * kSecondsOfDay * static_cast<double>(fractions.At(cell)));
-    }
-    return {};
-  };
+  building.Tell(Fate::Carried, *climate, where, "RechargeOption");
+  recharge.rates = RatesOf(building, std::move(rain), std::move(fractions));
   building.model.recharge = std::move(recharge);
   building.Tell(Fate::Carried, *precipitation, "rates of RCH: the mean of each period");
   if (components.Recharge_ModelType == kRechargeSeepageFace)
     building.Tell(Fate::LeftOut, components, "a seepage face has no counterpart", "Recharge_ModelType");
   if (climate->PondingOption == CPrecipitationRelatedKvf::kUpToPondingElevation)
     building.Tell(Fate::LeftOut, *climate, "ponding up to an elevation has no counterpart", "PondingOption");
+  return true;
+}
+
+bool BuildEvapotranspiration(Building& building) {
+  const auto& components = *building.root.Important(kModflowComponents);
+  if (components.ET == 0) return true;
+  // What old files bring stands beside the tree.
+  const auto* old = building.root.Important(kOldEvapotranspiration);
+  const auto* reference = building.root.Important(kReferenceEvapotranspiration);
+  const auto* surfaces = old ? SpansIn(*old, kETSurfaceElevation) : nullptr;
+  const auto* depths = old ? SpansIn(*old, kETExtinctionDepth) : nullptr;
+  const auto* layers = old ? SpansIn(*old, kETLayer) : nullptr;
+  if (!surfaces || !depths || !reference || surfaces->GetItemCount() == 0 || depths->GetItemCount() == 0) {
+    building.Tell(Fate::LeftOut, components,
+                  "there is no EVT: the setup holds no surface and depth of evapotranspiration", "ET");
+    return true;
+  }
+  AreaStress evapotranspiration;
+  CellForcing demand;
+  if (!TakeForcing(building, *reference, demand) ||
+      !TakeSpans(building, *surfaces, "SURFACE of EVT", evapotranspiration.surfaces) ||
+      !TakeSpans(building, *depths, "DEPTH of EVT", evapotranspiration.depths))
+    return false;
+  evapotranspiration.isFixedToCell = old->ETLayer != 0;
+  if (layers && old->ETLayer != 0 && !TakeSpans(building, *layers, "IEVT of EVT", evapotranspiration.layers))
+    return false;
+  evapotranspiration.rates = RatesOf(building, std::move(demand), LayerValues(1.0F));
+  building.model.evapotranspiration = std::move(evapotranspiration);
+  building.Tell(Fate::Carried, *reference, "rates of EVT: the mean of each period");
   return true;
 }
 

@@ -133,7 +133,7 @@ class ModelReader {
       const Row& head = block.lines[i];
       Check(known.contains(head[0]), "no array of this package: " + head[0]);
       const bool isLayered = head.size() > 1 && head[1] == "LAYERED";
-      const bool isWhole = head[0] == "IDOMAIN" || head[0] == "IRCH";
+      const bool isWhole = head[0] == "IDOMAIN" || head[0] == "IRCH" || head[0] == "IEVT";
       for (int layer = 1; layer <= (isLayered ? layers : 1); ++layer)
         arrays[fmt::format("{}{}/{}", head[0], suffix, layer)] = ReadArray(block.lines.at(++i), isWhole);
     }
@@ -165,7 +165,8 @@ class ModelReader {
         {"NPF6", {"ICELLTYPE", "K", "K22", "K33", "WETDRY"}},
         {"IC6", {"STRT"}},
         {"STO6", {"ICONVERT", "SS", "SY"}},
-        {"RCH6", {"IRCH", "RECHARGE"}}};
+        {"RCH6", {"IRCH", "RECHARGE"}},
+        {"EVT6", {"IEVT", "SURFACE", "RATE", "DEPTH"}}};
     if (type == "DIS6")
       for (const InputBlock& block : blocks)
         if (block.name == "DIMENSIONS") {
@@ -178,7 +179,7 @@ class ModelReader {
       const bool isPeriod = block.name.starts_with("PERIOD ");
       if (block.name == "DIMENSIONS" && type != "DIS6") most = std::stoul(block.lines.at(0).at(1));
       if (isPeriod) Check(std::stoul(block.name.substr(7)) <= periods.size(), "a period that is none");
-      if (block.name == "GRIDDATA" || (type == "RCH6" && isPeriod))
+      if (block.name == "GRIDDATA" || ((type == "RCH6" || type == "EVT6") && isPeriod))
         ReadArrays(block, isPeriod ? "@" + block.name.substr(7) : "", kArrays.at(type));
       if (isPeriod && (type == "CHD6" || type == "GHB6" || type == "DRN6" || type == "WEL6"))
         ReadStress(type, name, std::stoi(block.name.substr(7)), block, most);

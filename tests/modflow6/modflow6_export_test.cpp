@@ -19,6 +19,7 @@
 #include "subsurface/internal_boundary.h"
 #include "subsurface/saturated_zone.h"
 #include "subsurface/wells.h"
+#include "surface/climate.h"
 #include "tests/modflow6/model_reader.h"
 #include "tests/simspec/test_setup.h"
 #include "tests/support/data_files.h"
@@ -172,7 +173,8 @@ TEST(Modflow6Export, EnginesAndOptionsDecideWhatIsWritten) {
 /// Six by five cells of 100 m, flat at 100 m, whose outer cells are the boundary; two layers of 20 and 30 m.
 class Box {
  public:
-  explicit Box(const std::string& layers, const std::string& zone = "") : setup(Sections(layers, zone)) {
+  explicit Box(const std::string& layers, const std::string& zone = "", const std::string& further = "")
+      : setup(Sections(layers, zone) + further) {
     GridGeometry geometry;
     geometry.nx = 6, geometry.ny = 5, geometry.cellSize = 100;
     std::vector<float> domain(30, 2.0F), zones(30, kUsualDeleteValue), units(30, 1.0F);
@@ -283,6 +285,24 @@ TEST(Modflow6Export, UnitsLevelsAndRewettingReachTheCells) {
   EXPECT_TRUE(model.Options("NPF6").contains("K22OVERK"));
   EXPECT_TRUE(model.Options("NPF6").contains("REWET"));
   EXPECT_NEAR(model.At("WETDRY/1", 1, 1), -0.1, 1e-6);
+}
+
+TEST(Modflow6Export, EvapotranspirationOfAnOldFileIsThereOnceMore) {
+  const auto spans = [](const std::string& section, const std::string& keys) {
+    return "section " + section + " {\n YbSEKvfListItemCount = 1\nsection STRESSPERIODSPAN_1 {\n StressPeriodTo = 1\n" +
+           keys + "}\n}\n";
+  };
+  Box box("", "",
+          "section Evapotrans {\n ETLayer = 1\n" +
+              spans("ETSurfaceElevation", "RelativeToGround = 1\nFixedValue = -0.5f\n") +
+              spans("ETExtinctionDepth", "FixedValue = 2.0f\n") + spans("ETLayer", "FixedValue = 2.0f\n") + "}\n");
+  box.setup.Root().Important(kModflowComponents)->ET = 1;
+  box.setup.Root().Important(kReferenceEvapotranspiration)->Global().FIXED_VALUE = 3;
+  const ModelReader model = box.Exported();
+  EXPECT_NEAR(model.At("SURFACE@1/1", 3, 3), 99.5, 1e-6);
+  EXPECT_EQ(model.At("DEPTH@1/1", 3, 3), 2);
+  EXPECT_EQ(model.At("IEVT@1/1", 3, 3), 2);
+  EXPECT_NEAR(model.At("RATE@1/1", 3, 3), 0.003, 1e-8);
 }
 
 TEST(Modflow6Export, WhatIsNoModelIsRefusedAndTheFolderStaysAsItWas) {
