@@ -16,7 +16,7 @@ namespace tervane {
 namespace {
 
 constexpr int kTableWidth = 760, kTextWidth = 420;
-constexpr int kDiskInterval = 2000;  ///< Milliseconds between looks at the file on disk.
+constexpr int kTemplateInterval = 2000;  ///< Milliseconds between looks at the file on disk.
 
 }  // namespace
 
@@ -37,7 +37,7 @@ TemplateTab::TemplateTab(const std::string& path, Host& host) : view_(path), hos
   all->addWidget(body);
   Redraw();
   connect(&disk_, &QTimer::timeout, this, &TemplateTab::Reload);
-  disk_.start(kDiskInterval);
+  disk_.start(kTemplateInterval);
 }
 
 TemplateTab::~TemplateTab() {
