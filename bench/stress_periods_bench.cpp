@@ -10,6 +10,7 @@
 
 #include "bench/median_table.h"
 #include "document/edit_session.h"
+#include "forms/page.h"
 #include "pages/page_table.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/pages.h"
