@@ -41,7 +41,8 @@ std::string StressPeriodsText(const CStressPeriodsKvf& periods) {
   const bool isAdaptive = EngineOf(periods) == kEngineModflowSurfact;
   std::string text = fmt::format("{} stress periods from {} on.\n", periods.GetItemCount(), periods.GetDateText(0));
   for (int number = 1; number <= periods.GetItemCount(); ++number) {
-    if (number > kMostPeriods) return text + fmt::format("and {} periods more\n", periods.GetItemCount() - kMostPeriods);
+    if (number > kMostPeriods)
+      return text + fmt::format("and {} periods more\n", periods.GetItemCount() - kMostPeriods);
     const CStressPeriodsItemKvf& period = *periods.GetItem(number);
     const double days = periods.LengthOf(number).InDays();
     text += fmt::format("{} to {}: {} days", number, periods.GetDateText(number), FormatNumber(days, "%.6g"));

@@ -156,7 +156,10 @@ class BoundaryBuilder {
           segment.BoundaryType == CGeoDataBoundCondItemKvf::kFixedHead ? heads_.package : rates_.package;
       std::vector<StressEntry> entries = EntriesOf(package, name, segments, number - 1);
       if (entries.empty()) {
-        building_.Tell(Fate::LeftOut, segment, "it has no active cell on the outer boundary");
+        const bool isTraced = list.GetTraceFault().empty();
+        building_.Tell(Fate::LeftOut, segment,
+                       isTraced ? "it has no active cell on the outer boundary"
+                                : "the boundary of the domain cannot be followed: see the warning of the setup");
         continue;
       }
       if (segment.BoundaryType == CGeoDataBoundCondItemKvf::kFixedHead) {

@@ -120,9 +120,9 @@ std::string WhyNoModel(const CYbSEKvfGlobalBase& root) {
 }
 
 bool Build(Building& building) {
-  constexpr bool (*kFunctions[])(Building&) = {BuildPeriods,    BuildDiscretization, BuildGround,
-                                               BuildBoundaries, BuildWells,          BuildDrains,
-                                               BuildRecharge,   BuildOutput,         BuildSolver};
+  constexpr bool (*kFunctions[])(Building&) = {
+      BuildPeriods,  BuildDiscretization,     BuildGround, BuildBoundaries, BuildWells, BuildDrains,
+      BuildRecharge, BuildEvapotranspiration, BuildOutput, BuildSolver};
   constexpr int kBegin = 10, kEnd = 50;
   int done = 0;
   for (const auto function : kFunctions) {

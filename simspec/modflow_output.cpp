@@ -180,12 +180,4 @@ void COutputModKvf::ExchangeKeys(KeyExchange& keys) {
   keys("ModPath", ModPath);
 }
 
-int COutputModKvf::ValidateData() {
-  const int engine = EngineOf(*this);
-  if (OutputControlOption == kEquidistant && engine != kEngineModflowSurfact)
-    AddWarning(fmt::format("{} has no output in equidistant time steps.", tervane::TextOf(kEngines, engine)),
-               "OutputControlOption", "its page takes every n'th time step instead");
-  return 1;
-}
-
 }  // namespace tervane

@@ -113,9 +113,6 @@ class COutputModKvf : public CTvnKvfBase {
   COutputModTimestepListKvf& TimeSteps() const { return *timeSteps_; }
   COutputModPackageListKvf& Packages() const { return *packages_; }
 
-  /// Equidistant output with an engine that does not have it is told.
-  int ValidateData() override;
-
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
 
