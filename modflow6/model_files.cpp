@@ -61,16 +61,13 @@ class ModelFiles {
       const char* doing;
       std::string (ModelFiles::*write)();
     };
-    constexpr Step kSteps[] = {{"Periods", &ModelFiles::WriteTdis},
-                               {"Grid", &ModelFiles::WriteDis},
-                               {"Ground", &ModelFiles::WriteNpf},
-                               {"Storage", &ModelFiles::WriteSto},
-                               {"Initial heads", &ModelFiles::WriteIc},
-                               {"Boundaries", &ModelFiles::WriteStresses},
-                               {"Recharge", &ModelFiles::WriteRecharge},
-                               {"Solver", &ModelFiles::WriteIms},
-                               {"Output control", &ModelFiles::WriteOutput},
-                               {"Names", &ModelFiles::WriteNames}};
+    constexpr Step kSteps[] = {
+        {"Periods", &ModelFiles::WriteTdis},      {"Grid", &ModelFiles::WriteDis},
+        {"Ground", &ModelFiles::WriteNpf},        {"Storage", &ModelFiles::WriteSto},
+        {"Initial heads", &ModelFiles::WriteIc},  {"Boundaries", &ModelFiles::WriteStresses},
+        {"Recharge", &ModelFiles::WriteRecharge}, {"Evapotranspiration", &ModelFiles::WriteEvapotranspiration},
+        {"Solver", &ModelFiles::WriteIms},        {"Output control", &ModelFiles::WriteOutput},
+        {"Names", &ModelFiles::WriteNames}};
     constexpr int kBegin = 50, kEnd = 99;
     int done = 0;
     for (const Step& step : kSteps) {

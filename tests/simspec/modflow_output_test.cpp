@@ -107,7 +107,7 @@ TEST(ModflowOutput, EnginesHaveDatesOrTimeSteps) {
       EXPECT_EQ(opened.setup.IsUsed("OutputModflow/OutputTimesteps"), engine == 2 || engine == 3);
       EXPECT_TRUE(opened.setup.IsUsed("OutputModflow/PackagesOutput"));
       opened.output.Validate();
-      EXPECT_EQ(opened.output.Findings().size(), (engine == 2 || engine == 3) && option == 0 ? 1U : 0U);
+      EXPECT_TRUE(opened.output.Findings().empty());
     }
 }
 
