@@ -522,7 +522,10 @@ void DocumentFrame::CheckTemplates() {
   }
   if (changed == changedTemplates_) return;
   changedTemplates_ = changed;
-  if (templateBanner_) templateBanner_->deleteLater();
+  if (templateBanner_) {
+    templateBanner_->hide();
+    templateBanner_->deleteLater();
+  }
   // Its own page tells the same.
   if (page_) page_->Sync();
   if (changed.empty()) return;

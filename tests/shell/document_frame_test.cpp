@@ -64,7 +64,7 @@ TEST(DocumentFrame, AFindingOffersWhatMendsItAsOneStep) {
   ASSERT_TRUE(mend);
   const int before = findings->Count();
   mend->trigger();
-  EXPECT_EQ(setup.Value("Sources/Source_1:Species"), "\"Species_1\"");
+  EXPECT_EQ(setup.Value("Sources/Source_1:Species"), "Species_1");
   EXPECT_EQ(findings->Count(), before - 1);
   setup.Command("Undo Change Species to Species_1");
   EXPECT_EQ(findings->Count(), before);

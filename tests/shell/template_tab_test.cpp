@@ -84,6 +84,7 @@ TEST_F(TemplateOfSetup, AChangeOnDiskIsOfferedAndTakenAsOneStep) {
   EXPECT_FALSE(setup_.Shows("has changed on disk"));
   setup_.Folder().Write("a.kinetra", TemplateWith("ABC"));
   setup_.Frame().CheckTemplates();
+  QApplication::processEvents();
   EXPECT_TRUE(setup_.Shows("The template a.kinetra has changed on disk."));
   // Nothing is taken until the user says so, whatever else is edited meanwhile.
   setup_.Command("Undo Choose Template");
