@@ -95,6 +95,12 @@ void PutLegendAbove(QCustomPlot& chart) {
 
 void ArrangeLegend(QCustomPlot& chart, int widest) {
   const int columns = chart.width() / (std::max(widest, 1) + Theme::Get().Scaled(44));
+  // One that leaves no place for the curves is left out, as a layout knows it: without a height.
+  const int rows = (chart.legend->itemCount() + std::max(1, columns) - 1) / std::max(1, columns);
+  const bool fits = rows * QFontMetrics(chart.legend->font()).height() <= chart.height() / 2;
+  chart.legend->setVisible(fits);
+  chart.legend->setMinimumSize(fits ? QSize(0, 0) : QSize(1, 1));
+  chart.legend->setMaximumSize(QWIDGETSIZE_MAX, fits ? QWIDGETSIZE_MAX : 1);
   if (chart.legend->wrap() == std::max(1, columns)) return;
   chart.legend->setWrap(std::max(1, columns));
   // The names that are there already move, too.
