@@ -3,6 +3,7 @@
 #include "modflow6/export_report.h"
 
 #include <algorithm>
+#include <unordered_set>
 
 #include <fmt/format.h>
 
@@ -18,29 +19,41 @@ void ExportReport::Add(Fate fate, std::string place, std::string text) {
   entries_.push_back({fate, std::move(place), std::move(text)});
 }
 
-bool ExportReport::SpeaksOf(const std::string& path) const {
-  return std::ranges::any_of(entries_, [&](const ExportEntry& entry) {
-    const std::size_t key = entry.place.find(':');
-    const std::string node = entry.place.substr(0, key);
-    // Who speaks of a key alone says nothing of the nodes below.
-    return node == path || (key == std::string::npos && path.starts_with(node + "/"));
-  });
-}
+namespace {
 
-void ExportReport::LeaveOutTheRest(CYbSEKvfBase& root) {
-  for (CYbSEKvfBase* child = root.GetFirstChild(); child; child = root.GetNextChild(child)) {
+/// What the entries speak of.
+struct Spoken {
+  std::unordered_set<std::string> whole;   ///< Nodes, with all below them.
+  std::unordered_set<std::string> partly;  ///< Nodes of which a key is told, and those above any node that is.
+
+  explicit Spoken(const std::vector<ExportEntry>& entries) {
+    for (const ExportEntry& entry : entries) {
+      const std::size_t key = entry.place.find(':');
+      std::string path = entry.place.substr(0, key);
+      (key == std::string::npos ? whole : partly).insert(path);
+      for (std::size_t end = path.rfind('/'); end != std::string::npos; end = path.rfind('/')) {
+        path.resize(end);
+        partly.insert(path);
+      }
+    }
+  }
+};
+
+void LeaveOutBelow(CYbSEKvfBase& node, const Spoken& spoken, ExportReport& report) {
+  for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child)) {
     if (!child->HoldsSetup() || !child->IsDataUsedInSetup()) continue;
     const std::string path = PathOf(*child);
-    if (SpeaksOf(path)) continue;
-    // A branch of which something is spoken further down is told node by node.
-    const bool isSplit =
-        std::ranges::any_of(entries_, [&](const ExportEntry& entry) { return entry.place.starts_with(path + "/"); });
-    if (!isSplit && child->GetDlgRuntimeClass(kSetupDataTree))
-      Add(Fate::LeftOut, path, fmt::format("{} has no counterpart", child->GetTitle()));
+    if (spoken.whole.contains(path)) continue;
+    if (!spoken.partly.contains(path) && child->GetDlgRuntimeClass(kSetupDataTree))
+      report.Add(Fate::LeftOut, path, fmt::format("{} has no counterpart", child->GetTitle()));
     else
-      LeaveOutTheRest(*child);
+      LeaveOutBelow(*child, spoken, report);
   }
 }
+
+}  // namespace
+
+void ExportReport::LeaveOutTheRest(CYbSEKvfBase& root) { LeaveOutBelow(root, Spoken(entries_), *this); }
 
 std::size_t ExportReport::Count(Fate fate) const {
   return static_cast<std::size_t>(std::ranges::count(entries_, fate, &ExportEntry::fate));

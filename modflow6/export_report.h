@@ -42,8 +42,6 @@ class ExportReport {
   std::string Text() const;
 
  private:
-  bool SpeaksOf(const std::string& path) const;
-
   std::vector<ExportEntry> entries_;
 };
 

@@ -32,32 +32,32 @@ struct CellForcing {
   }
 };
 
-bool TakeForcing(Building& building, const C2DStationBasedDataKvf& node, CellForcing& rain) {
+bool TakeForcing(Building& building, const C2DStationBasedDataKvf& node, CellForcing& taken) {
   const Forcing forcing = node.CurrentForcings().front();
-  rain.grids = forcing.overGrid;
-  if (rain.grids) return rain.grids->problem.empty() || building.Fail(node, rain.grids->problem);
+  taken.grids = forcing.overGrid;
+  if (taken.grids) return taken.grids->problem.empty() || building.Fail(node, taken.grids->problem);
   std::map<std::string, int> placeOfId;
   for (const ForcingSeries& series : forcing.series) {
     std::vector<double> means;
     const FileResult made = building.series.Means(series, forcing.itemType, means);
     if (!made.Ok()) return building.Fail(node, made.error);
     if (!made.note.empty()) building.Tell(Fate::Changed, node, made.note, "TYPE");
-    placeOfId[series.id] = static_cast<int>(rain.means.size());
-    rain.means.push_back(std::move(means));
+    placeOfId[series.id] = static_cast<int>(taken.means.size());
+    taken.means.push_back(std::move(means));
   }
   if (!forcing.areas) return true;
   AreaCodes areas;
   if (const FileResult read = ReadAreaCodes(*forcing.areas, {}, areas); !read.Ok())
     return building.Fail(node, read.error);
-  rain.seriesOfCell.assign(building.CellCount(), -1);
+  taken.seriesOfCell.assign(building.CellCount(), -1);
   const std::vector<std::optional<float>> found = ValuesIn(building.domain, areas.grid);
   std::size_t inDomain = 0, without = 0;
-  for (std::size_t cell = 0; cell < rain.seriesOfCell.size(); ++cell) {
+  for (std::size_t cell = 0; cell < taken.seriesOfCell.size(); ++cell) {
     if (building.domain.IsEmptyValue(building.domain.Values()[cell])) continue;
     const std::optional<float>& code = found[inDomain++];
     const auto place = code ? placeOfId.find(areas.IdOf(*code)) : placeOfId.end();
     if (place != placeOfId.end())
-      rain.seriesOfCell[cell] = place->second;
+      taken.seriesOfCell[cell] = place->second;
     else
       ++without;
   }

@@ -7,6 +7,7 @@
 #include "modflow6/building.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/modflow_solvers.h"
+#include "subsurface/saturated_zone.h"
 
 namespace tervane::modflow6 {
 
@@ -37,7 +38,7 @@ bool BuildSolver(Building& building) {
       solver.innerIterations = pcg.ITER1;
       solver.headChange = static_cast<double>(pcg.HCLOSE);
       solver.residual = static_cast<double>(pcg.RCLOSE);
-      // 1 is the usual value there, and forbidden with the preconditioner here only above 1.
+      // IMS takes no more than 1.
       solver.relaxation = std::clamp(static_cast<double>(pcg.RELAX), 0.0, 1.0);
       solver.printing = PrintingOf(pcg.MUTPCG);
       left = "DAMP";
@@ -49,7 +50,7 @@ bool BuildSolver(Building& building) {
       solver.outerIterations = pcg.MXITER;
       solver.innerIterations = pcg.ITERI;
       solver.headChange = static_cast<double>(pcg.HCLOSE);
-      solver.isNewton = pcg.UseNewtonRaphson != 0;
+      solver.isNewton |= pcg.UseNewtonRaphson != 0;
       solver.printing = PrintingOf(pcg.OutputFromSolver);
       left = "BFACT, RESRED, MNORTH, ApplyDampening";
       break;
@@ -83,6 +84,10 @@ bool BuildSolver(Building& building) {
   building.Tell(
       Fate::Changed, *control,
       fmt::format("IMS takes the place of {}, with its iterations and criteria, without {}", used->GetTitle(), left));
+  if (solver.isNewton && building.model.rewetting) {
+    building.model.rewetting.reset();
+    building.Tell(Fate::LeftOut, building.zone, "with Newton-Raphson no cell falls dry: NPF rewets none", "Threshold");
+  }
   if (auto* packages = building.root.Important(kBasicParameters)->Child<CCompControlParaModPackageKvf>();
       packages && packages->IsDataUsedInSetup() != 0) {
     if (building.model.rewetting) building.Tell(Fate::Carried, *packages, "NPF rewets with that factor", "HDRY2");

@@ -10,6 +10,7 @@
 #include "platform/files.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
+#include "simspec/modflow_solvers.h"
 #include "simspec/periods.h"
 #include "simspec/stress_periods.h"
 #include "spatial/data2d.h"
@@ -124,6 +125,9 @@ TEST(Modflow6Export, TheRhoneIsWhatItsSetupSays) {
   EXPECT_TRUE(rhone.Tells(Fate::Carried, "SaturatedZone/GeoLayersSZ/Layer_1/HorHydrCon", "K of NPF"));
   EXPECT_TRUE(rhone.Tells(Fate::Changed, "SaturatedZone/GeoLayersSZ/Layer_1/HorizontalAnisotropyRatio", "0"));
   EXPECT_TRUE(rhone.Tells(Fate::LeftOut, "SimSpec/CompControlParaModPackage:HDRY", "1e30"));
+  // Of a node of which only a key is told, those below are told one by one.
+  EXPECT_TRUE(rhone.Tells(Fate::Carried, "Climate:RechargeOption", "highest active cell"));
+  EXPECT_TRUE(rhone.Tells(Fate::LeftOut, "Climate/TempLapseRate", "no counterpart"));
   EXPECT_THAT(test::ReadFile(rhone.folder.File("model/export-report.txt")), HasSubstr("left out:"));
 }
 
@@ -154,6 +158,14 @@ TEST(Modflow6Export, EnginesAndOptionsDecideWhatIsWritten) {
   EXPECT_TRUE(FileExists(rhone.folder.File("adaptive/rhone__modflow.ats")));
   EXPECT_THAT(test::ReadFile(rhone.folder.File("adaptive/rhone__modflow.ats")), HasSubstr("  2 2 1e-05 1000 1.1 0\n"));
   EXPECT_TRUE(rhone.Tells(Fate::Changed, "SimSpec/STRESSPERIODS", "nearest"));
+
+  // What cannot be had without Newton-Raphson has it, whatever the solver says.
+  auto& components = *rhone.setup.Root().Important(kModflowComponents);
+  components.ChooseVariablySaturated(1);
+  basics.Child<CCompControlParaModKvf>()->SolverOption = kSolverPCG4;
+  rhone.Exported("saturated");
+  EXPECT_THAT(test::ReadFile(rhone.folder.File("saturated/rhone__modflow.nam")), HasSubstr("NEWTON"));
+  components.ChooseVariablySaturated(0);
 
   basics.ModelType = kEngineModflow96;
   periods.MfSteadyState = 1;

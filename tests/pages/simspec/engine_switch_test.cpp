@@ -16,7 +16,7 @@ using test::SetupText;
 using testing::IsEmpty;
 using testing::UnorderedElementsAre;
 
-/// A setup with an engine and further keys of its specification.
+/// A setup with an engine and further keys of the section `SimSpec`.
 std::string Sections(int engine, const std::string& keys) {
   return SetupText(14, fmt::format("section SimSpec {{\nModelType = {}\n{}\n}}", engine, keys));
 }
