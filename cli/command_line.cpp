@@ -54,6 +54,7 @@ constexpr CommandFile kFiles[] = {
     {OfferDataCommands},
     {OfferImports},
     {OfferExportCommands},
+    {OfferResultsCommands},
     {OfferCompletion},
 };
 

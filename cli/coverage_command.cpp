@@ -11,6 +11,7 @@
 #include "cli/commands.h"
 #include "cli/json.h"
 #include "cli/setup_file.h"
+#include "cli/text_table.h"
 #include "data/datafile_request.h"
 #include "platform/paths.h"
 #include "platform/text.h"
@@ -19,31 +20,6 @@
 namespace tervane {
 
 namespace {
-
-using Rows = std::vector<std::vector<std::string>>;
-
-/// Characters that take a place on the screen.
-std::size_t WidthOf(const std::string& text) {
-  return static_cast<std::size_t>(
-      std::ranges::count_if(text, [](char c) { return (static_cast<unsigned char>(c) & 0xC0u) != 0x80u; }));
-}
-
-/// Cells below each other, the first row as heads.
-void WriteTable(Rows rows, std::ostream& out) {
-  std::vector<std::size_t> widths;
-  for (auto& row : rows)
-    for (std::string& cell : row) cell = OneLine(cell);
-  for (const auto& row : rows) {
-    widths.resize(std::max(widths.size(), row.size()), 0);
-    for (std::size_t i = 0; i < row.size(); ++i) widths[i] = std::max(widths[i], WidthOf(row[i]));
-  }
-  for (const auto& row : rows) {
-    std::string line;
-    for (std::size_t i = 0; i < row.size(); ++i) line += "  " + row[i] + std::string(widths[i] - WidthOf(row[i]), ' ');
-    while (!line.empty() && line.back() == ' ') line.pop_back();
-    fmt::print(out, "{}\n", line);
-  }
-}
 
 std::string DateText(std::int64_t seconds) { return DateInWords(CYbDateTime::FromSecondsSinceEpoch(seconds)); }
 
@@ -62,12 +38,12 @@ std::string DomainText(const CoverageBoard& board) {
 
 void WriteText(const CoverageBoard& board, std::ostream& out) {
   fmt::print(out, "simulation: {}\ndomain: {}\n", SimulationText(board), DomainText(board));
-  Rows rows{{"state", "data", "file", "item", "period", "simulation", "domain"}};
+  TextRows rows{{"state", "data", "file", "item", "period", "simulation", "domain"}};
   for (const CoverageRow& row : board.rows)
     rows.push_back({std::string(NameOf(row.state)), row.file.title, std::string(FileNameOf(row.file.use.path)),
                     row.item, row.PeriodText(), row.TimeText(), row.AreaText()});
   fmt::print(out, "\nfiles: {}\n", board.rows.size());
-  if (!board.rows.empty()) WriteTable(rows, out);
+  if (!board.rows.empty()) WriteTextTable(rows, out);
   for (const CoverageRow& row : board.rows)
     for (const Finding& remark : row.remarks)
       fmt::print(out, "{}: {}: {}{}\n", NameOf(remark.severity), OneLine(row.file.path), OneLine(remark.text),
@@ -77,7 +53,7 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
       fmt::print(out, "{}: {}: {}\n", NameOf(finding.severity), OneLine(check.check.path), OneLine(finding.text));
   for (const ForcingTotals& totals : board.forcings) {
     fmt::print(out, "\n{}: {}; in brackets shares of domain and time\n", totals.forcing.path, totals.Heading());
-    Rows table{{"station"}};
+    TextRows table{{"station"}};
     for (const TotalsPeriod& period : board.periods) table.front().push_back(period.name);
     const int decimals = totals.Decimals();
     for (std::size_t column = 0; column < totals.columns.size(); ++column) {
@@ -86,7 +62,7 @@ void WriteText(const CoverageBoard& board, std::ostream& out) {
       for (std::size_t period = 0; period < board.periods.size(); ++period)
         row.push_back(totals.ValueText(column, period, board.periods[period].span, decimals));
     }
-    WriteTable(table, out);
+    WriteTextTable(table, out);
     for (const ForcingTotals::Column& column : totals.columns)
       if (!column.problem.empty()) fmt::print(out, "error: {}: {}\n", OneLine(column.name), OneLine(column.problem));
     for (const Finding& remark : totals.remarks)

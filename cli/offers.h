@@ -62,6 +62,7 @@ void OfferRiverImport(CommandOffers& offers, const Command& family);
 void OfferWellImport(CommandOffers& offers, const Command& family);
 void OfferExportCommands(CommandOffers& offers);
 void OfferModflow6Export(CommandOffers& offers, const Command& family);
+void OfferResultsCommands(CommandOffers& offers);
 void OfferCompletion(CommandOffers& offers);
 
 }  // namespace tervane

@@ -43,7 +43,7 @@ bool LooksSame(const Series& a, const Series& b) {
     return std::bit_cast<std::uint64_t>(x) == std::bit_cast<std::uint64_t>(y);
   };
   return a.name == b.name && a.unit == b.unit && a.isStepped == b.isStepped && a.panel == b.panel &&
-         a.isLogarithmic == b.isLogarithmic && a.color == b.color && a.times == b.times &&
+         a.isLogarithmic == b.isLogarithmic && a.color == b.color && a.isPoints == b.isPoints && a.times == b.times &&
          std::ranges::equal(a.positions, b.positions, sameBits) && std::ranges::equal(a.values, b.values, sameBits);
 }
 

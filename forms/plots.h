@@ -257,6 +257,7 @@ struct Series {
   bool isLogarithmic = false;
   /// The number of its colour, where it is not that of its place among the series.
   std::optional<std::size_t> color = {};
+  bool isPoints = false;  ///< Each value is a dot of its own; no line leads from one to the next.
 };
 
 /// A series of a file that a user may lay over those of a chart.

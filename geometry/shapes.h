@@ -26,8 +26,11 @@ enum class AttributeKind { Text = 0, Whole = 1, Real = 2 };
 struct ShapeField {
   std::string name;
   AttributeKind kind = AttributeKind::Text;
+  // Of a table that is written.
+  int width = 0;      ///< In characters; as wide as its values need when nothing is said.
+  int decimals = 15;  ///< Of real numbers.
 
-  bool operator==(const ShapeField&) const = default;
+  bool operator==(const ShapeField& other) const { return name == other.name && kind == other.kind; }
 };
 
 /// The value of an attribute, nothing where the table has none.

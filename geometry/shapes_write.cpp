@@ -47,7 +47,7 @@ Reason StoredText(const ShapeField& field, const ShapeValue& value, std::string&
   if (field.kind == AttributeKind::Real && (asReal || asWhole)) {
     const double real = asReal ? *asReal : static_cast<double>(*asWhole);
     if (!std::isfinite(real)) return fmt::format("{} is {}, which is no number", field.name, real);
-    text = ShortestNumber(real);
+    text = field.width > 0 ? fmt::format("{:.{}f}", real, field.decimals) : ShortestNumber(real);
     return {};
   }
   return fmt::format("the value of {} is not {}", field.name, NameOf(field.kind));
@@ -65,18 +65,24 @@ Reason MakeTable(const std::vector<ShapeField>& columns, const std::vector<Shape
       return fmt::format("the name of the attribute \"{}\" has {} bytes; 1 to 10 can be stored", field.name,
                          field.name.size());
     }
-    std::size_t width = field.kind == AttributeKind::Text ? 1 : field.kind == AttributeKind::Whole ? 9 : 24;
+    const bool isFixed = field.width > 0;
+    std::size_t width = isFixed                              ? static_cast<std::size_t>(field.width)
+                        : field.kind == AttributeKind::Text  ? 1
+                        : field.kind == AttributeKind::Whole ? 9
+                                                             : 24;
     for (std::size_t i = 0; i < shapes.size(); ++i) {
       if (shapes[i].values.size() != columns.size()) {
         return fmt::format("shape {} has {} values for {} attributes", i + 1, shapes[i].values.size(), columns.size());
       }
       if (const Reason reason = StoredText(field, shapes[i].values[c], texts[c][i]); !reason.empty())
         return fmt::format("shape {}: {}", i + 1, reason);
+      if (isFixed && texts[c][i].size() > width)
+        return fmt::format("shape {}: {} is {}; its column holds {} characters", i + 1, field.name, texts[c][i], width);
       width = std::max(width, texts[c][i].size());
     }
     const bool isReal = field.kind == AttributeKind::Real;
     if (DBFAddNativeFieldType(table.get(), field.name.c_str(), field.kind == AttributeKind::Text ? 'C' : 'N',
-                              static_cast<int>(width), isReal ? 15 : 0) < 0) {
+                              static_cast<int>(width), isReal ? field.decimals : 0) < 0) {
       return fmt::format("the attribute {} does not fit into the table", field.name);
     }
   }

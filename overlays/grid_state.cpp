@@ -5,94 +5,13 @@
 #include <fmt/format.h>
 
 #include "core/kvf.h"
-#include "geometry/cart.h"
+#include "overlays/overlay_walk.h"
 #include "platform/files.h"
 #include "platform/paths.h"
 
 namespace tervane {
 
 namespace {
-
-void PutColor(KvfFile* file, const char* key, const OverlayColor& color) {
-  kvfPutListParam(file, key, "iii", color.r, color.g, color.b);
-}
-
-void PutLayerFile(KvfFile* file, int kind, const FileName& name) {
-  kvfAddKeyword(file, "ImageFileName");
-  kvfAddInt(file, kind);
-  kvfAddFilename(file, name.Absolute());
-}
-
-void PutImage(KvfFile* file, const COverlayBMPKvf& image) {
-  PutLayerFile(file, 0, image.Filename);
-  kvfPutParam(file, "AxisUnit", 0);
-  kvfAddSection(file, "PROPERTIES");
-  kvfPutParam(file, "Display", image.Display != 0);
-  kvfPutParam(file, "wc_x0", image.BMP_X0);
-  kvfPutParam(file, "wc_y0", image.BMP_Y0);
-  kvfPutParam(file, "wc_x1", image.BMP_X1);
-  kvfPutParam(file, "wc_y1", image.BMP_Y1);
-  kvfPutParam(file, "DisplayStyle", image.BMP_DisplayStyle);
-  const int color = image.BMP_TransparentColor;
-  PutColor(file, "TransparentColor", {color & 0xff, color >> 8 & 0xff, color >> 16 & 0xff});
-  kvfEndSection(file);
-}
-
-void PutShape(KvfFile* file, const COverlayShapeKvf& shape) {
-  PutLayerFile(file, 1, shape.Filename);
-  kvfAddString(file, shape.ItemDescr);
-  kvfPutParam(file, "AxisUnit", shape.ShapeAxisUnit);
-  kvfAddSection(file, "PROPERTIES");
-  kvfAddSection(file, "Quarzel_Shape_Polygon_Object");
-  kvfPutParam(file, "Base_Title", "Shape Polylines");
-  kvfPutParam(file, "Base_Reg_Key", "");
-  kvfPutParam(file, "Base_Col_Red", shape.LineColor.r);
-  kvfPutParam(file, "Base_Col_Green", shape.LineColor.g);
-  kvfPutParam(file, "Base_Col_Blue", shape.LineColor.b);
-  kvfPutParam(file, "Base_Display_On", true);
-  kvfPutParam(file, "Line_Thickness", shape.LineThickness);
-  kvfPutParam(file, "Line_Style", shape.LineStyle);
-  kvfPutParam(file, "Line_Polygon_Style", shape.PolygonStyle);
-  kvfPutParam(file, "Draw_Text", shape.ShowLineText);
-  kvfPutParam(file, "Text_Color_Style", shape.LineTextColorOption);
-  PutColor(file, "Text_Color", shape.LineTextColor);
-  kvfPutParam(file, "Text_Bk_Mode", shape.LineTextBackground);
-  kvfEndSection(file);
-  kvfPutParam(file, "Display", shape.Display != 0);
-  kvfPutParam(file, "ConversionType", 2);
-  kvfPutParam(file, "ProjectionType", "");
-  kvfEndSection(file);
-}
-
-void PutRiver(KvfFile* file, const COverlayRiverKvf& river) {
-  PutLayerFile(file, 3, river.FvrNwkFilename_Specified);
-  kvfPutParam(file, "AxisUnit", 0);
-  kvfAddSection(file, "PROPERTIES");
-  kvfPutParam(file, "Display", river.Display != 0);
-  kvfPutParam(file, "ConversionType", 2);
-  kvfPutParam(file, "ProjectionType", CYbMapProjection::IDtoProjectionString(1));
-  kvfPutParam(file, "DisplayType", 4);
-  kvfPutParam(file, "MarkerSize", 0.2);
-  kvfEndSection(file);
-}
-
-/// Each layer counts, also one of a kind that the file has no place for.
-void PutLayers(KvfFile* file, const COverlayListKvf& list, int& counter) {
-  for (int number = 1; number <= list.GetItemCount(); ++number) {
-    ++counter;
-    const OverlayLayer* layer = list.GetItem(number)->Layer();
-    const auto* river = dynamic_cast<const COverlayRiverKvf*>(layer);
-    if (const auto* image = dynamic_cast<const COverlayBMPKvf*>(layer))
-      PutImage(file, *image);
-    else if (const auto* shape = dynamic_cast<const COverlayShapeKvf*>(layer))
-      PutShape(file, *shape);
-    else if (river && !river->LayerFile().IsEmpty())
-      PutRiver(file, *river);
-    else
-      continue;
-    kvfPutParam(file, "OverlayDrawingOrder", counter);
-  }
-}
 
 bool HasShownLayer(const COverlayListKvf& list) {
   for (int number = 1; number <= list.GetItemCount(); ++number) {
@@ -127,9 +46,9 @@ std::string PrepareGridState(const COverlaysKvf& overlays, const FileName& grid,
 
   kvfAddSection(file, "IMAGE_FILES");
   int counter = -1;
-  PutLayers(file, overlays.Background(), counter);
+  WriteOverlays(file, overlays.Background(), kGridStateForm, counter);
   const int behindBackground = ++counter;
-  PutLayers(file, overlays.Foreground(), counter);
+  WriteOverlays(file, overlays.Foreground(), kGridStateForm, counter);
   ++counter;
   kvfEndSection(file);
 

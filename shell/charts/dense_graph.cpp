@@ -15,7 +15,7 @@ void DenseGraph::draw(QCPPainter* painter) {
   // With fewer points lines are told apart, and look better when they are drawn one by one.
   constexpr int kManyInColumn = 2;
   const bool isLinear = keyAxis()->scaleType() == QCPAxis::stLinear && valueAxis()->scaleType() == QCPAxis::stLinear;
-  if (isLinear && end - begin > kManyInColumn * clipRect().width()) {
+  if (isLinear && lineStyle() != lsNone && end - begin > kManyInColumn * clipRect().width()) {
     DrawColumns(painter, ColumnsOf(begin, end));
     return;
   }

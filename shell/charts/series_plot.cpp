@@ -312,7 +312,8 @@ void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) 
   graph->setAdaptiveSampling(true);
   // A value between two gaps makes no line, and is seen as a point where points do not run together.
   constexpr qsizetype kFewPoints = 60;
-  if (points.size() <= kFewPoints && !series.isStepped)
+  if (series.isPoints) graph->setLineStyle(QCPGraph::lsNone);
+  if (series.isPoints || (points.size() <= kFewPoints && !series.isStepped))
     graph->setScatterStyle(QCPScatterStyle(QCPScatterStyle::ssDisc, Theme::Get().Scaled(4)));
   curves_.push_back({&series, graph});
 }
