@@ -14,6 +14,7 @@
 #include "execution/execute_flags.h"
 #include "execution/processed_data.h"
 #include "overlays/overlays.h"
+#include "results/result_nodes.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/extra_params.h"
 #include "simspec/introduction.h"
@@ -29,7 +30,6 @@
 #include "surface/land_use.h"
 #include "surface/overland.h"
 #include "surface/rivers.h"
-#include "wqpt/extractions.h"
 #include "wqpt/kinetra_specification.h"
 #include "wqpt/processes.h"
 #include "wqpt/sources.h"
@@ -96,6 +96,7 @@ constexpr std::array kChildren{
     Child<CExtraParamsKvf>(),
     Child<CExecuteEngineFlagsKvf>(kExecuteFlags),
     Child<CProcDataKvf>(kProcessedData),
+    Child<CResultKvf>(kResult),
     Child<CResultsPostProcessingKvf>(kPostProcessing),
     Child<COverviewKvf>(kOverview),
     Child<CCoverageKvf>(kCoverage),

@@ -12,6 +12,7 @@
 #include "data/datafile_request.h"
 #include "data/grid_files.h"
 #include "engine/modflow_report.h"
+#include "engine/result_catalogue.h"
 #include "geometry/grid_polygons.h"
 #include "geometry/shapes.h"
 #include "platform/item_types.h"
@@ -127,6 +128,12 @@ bool Preprocessor::Run() {
     return false;
   }
   log_.Line("wrote " + path);
+  const std::string catalogue = ResolvedPath(document_.SimulationCatalogue(), {});
+  if (const std::string error = WriteCatalogueOfInput(catalogue, grids_, report_.lowerLevelFile, *domain_);
+      !error.empty())
+    log_.Warning({}, error);
+  else
+    log_.Line("wrote " + catalogue);
   return true;
 }
 

@@ -93,9 +93,7 @@ std::string WriteReport(const std::string& path, const Report& report) {
     kvfPutParam(file, "NumberOfLayers", report.numberOfLayers);
   }
   kvfEndSection(file);
-  kvfAddSection(file, "DetailedTimeseriesOutput");
-  kvfPutParam(file, "NumberOfItems", 0);
-  kvfEndSection(file);
+  WriteDetailedPoints(file, report.detailedPoints, folder);
   kvfEndSection(file);
 
   kvfWrite(file, path);

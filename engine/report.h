@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "platform/dates.h"
+#include "results/detailed_points.h"
 
 namespace tervane {
 
@@ -52,6 +53,7 @@ struct Report {
   int topographyItem = 0;
   std::string lowerLevelFile;  ///< Of the computational layers; empty when the setup has none.
   int lowerLevelItem = 0, numberOfLayers = 0;
+  std::vector<DetailedPoint> detailedPoints;  ///< At which a simulation stores series.
 };
 
 /// Writes the report in one step. "" or why that failed; then an old report stands.

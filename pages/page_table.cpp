@@ -4,6 +4,8 @@
 
 #include "pages/document/document_pages.h"
 #include "pages/execution/processed_pages.h"
+#include "pages/results/statistics_pages.h"
+#include "pages/results/viewer_pages.h"
 #include "pages/simspec/components_pages.h"
 #include "pages/simspec/control_pages.h"
 #include "pages/simspec/modflow_pages.h"
@@ -83,6 +85,8 @@ constexpr PageFile kFiles[] = {
     {"wqpt", KinetraPages},
     {"wqpt", ParticlePages},
     {"execution", ProcessedPages},
+    {"results", ViewerPages},
+    {"results", StatisticsPages},
 };
 
 std::unique_ptr<CYbSEDlgBase> Construct(const PageClass& page, CYbSEKvfBase& node, const PageContext& context) {

@@ -4,11 +4,13 @@
 
 #include <fmt/format.h>
 
-#include "core/kvf.h"
+#include "platform/paths.h"
 
 namespace tervane {
 
 namespace {
+
+constexpr std::string_view kPointsSection = "DetailedTimeseriesOutput";
 
 SeriesPlace ReadPlace(KvfNode* section, std::string_view fileKey, std::string_view itemKey) {
   SeriesPlace place;
@@ -47,7 +49,7 @@ FileResult ReadDetailedPoints(const std::string& report, std::vector<DetailedPoi
                                      : fmt::format("Can not open file :\n{}\n\n{}", report, kvfErrorText()),
             {}};
   }
-  KvfNode* section = kvfSectionByNameNum(kvfTargetByNameNum(file, "Extra_Data", 1), "DetailedTimeseriesOutput", 1);
+  KvfNode* section = kvfSectionByNameNum(kvfTargetByNameNum(file, "Extra_Data", 1), kPointsSection, 1);
   int count = 0;
   kvfGetParam(section, "NumberOfItems", &count, 1, 1);
   for (int number = 1; number <= count; ++number) {
@@ -57,6 +59,31 @@ FileResult ReadDetailedPoints(const std::string& report, std::vector<DetailedPoi
   }
   kvfClose(&file);
   return {};
+}
+
+void WriteDetailedPoints(KvfFile* file, const std::vector<DetailedPoint>& points, const std::string& folder) {
+  const auto putPlace = [&](const SeriesPlace& place, std::string_view fileKey, std::string_view itemKey) {
+    kvfPutParamFilename(file, fileKey, place.path.empty() ? std::string() : RelativePath(place.path, folder));
+    kvfPutParam(file, itemKey, place.item);
+  };
+  kvfAddSection(file, kPointsSection);
+  kvfPutParam(file, "NumberOfItems", static_cast<int>(points.size()));
+  int number = 0;
+  for (const DetailedPoint& point : points) {
+    kvfAddSection(file, fmt::format("Item_{}", ++number));
+    kvfPutParam(file, "Name", point.name);
+    kvfPutParam(file, "DataTypeName", point.dataType);
+    kvfPutParam(file, "X", point.x);
+    kvfPutParam(file, "Y", point.y);
+    kvfPutParam(file, "iX", point.column);
+    kvfPutParam(file, "iY", point.row);
+    kvfPutParam(file, "iLay", point.layer);
+    putPlace(point.simulated, "SimDataFileName", "SimDataFileItemNo");
+    kvfPutParam(file, "InclObsData", point.includesObserved ? 1 : 0);
+    putPlace(point.observed, "ObsDataFileName", "ObsDataFileItemNo");
+    kvfEndSection(file);
+  }
+  kvfEndSection(file);
 }
 
 }  // namespace tervane

@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "core/kvf.h"
 #include "platform/files.h"
 
 namespace tervane {
@@ -34,5 +35,8 @@ struct DetailedPoint {
 
 /// Reads the points of a report; one without points gives none. What the report says in too few items is left out.
 FileResult ReadDetailedPoints(const std::string& report, std::vector<DetailedPoint>& points);
+
+/// Writes the points into the section of a report that holds them; names of files are relative to its folder.
+void WriteDetailedPoints(KvfFile* file, const std::vector<DetailedPoint>& points, const std::string& folder);
 
 }  // namespace tervane

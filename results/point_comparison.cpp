@@ -71,12 +71,12 @@ PointComparer::PointComparer(const ComparedPeriod& period, const DisplayUnits& u
   end_ = period.end.SecondsSinceEpoch();
 }
 
-std::string PointComparer::OpenSimulated(const std::string& path) {
-  if (openPath_ == path) return {};
-  openPath_.reset();
-  simulated_ = DataFile();
-  std::string error = simulated_.Open(path);
-  if (error.empty()) openPath_ = path;
+std::string PointComparer::OpenFile::Open(const std::string& wanted) {
+  if (path == wanted) return {};
+  path.reset();
+  file = DataFile();
+  std::string error = file.Open(wanted);
+  if (error.empty()) path = wanted;
   return error;
 }
 
@@ -84,17 +84,17 @@ PointComparison PointComparer::Compare(const DetailedPoint& point, ProgressPart 
   PointComparison comparison;
   comparison.point = point;
   std::string& problem = comparison.problem;
-  DataFile observed;
-  problem = OpenSimulated(point.simulated.path);
-  if (problem.empty()) problem = observed.Open(point.observed.path);
+  problem = simulated_.Open(point.simulated.path);
+  if (problem.empty()) problem = observed_.Open(point.observed.path);
   comparison.isUnreadable = !problem.empty();
-  if (problem.empty()) problem = WhyNoSeries(simulated_, point.simulated.item);
+  const DataFile &simulated = simulated_.file, &observed = observed_.file;
+  if (problem.empty()) problem = WhyNoSeries(simulated, point.simulated.item);
   if (problem.empty()) problem = WhyNoSeries(observed, point.observed.item);
   if (!problem.empty()) return comparison;
 
-  const ComparedUnit unit = UnitOfComparison(ItemOf(simulated_, point.simulated.item), units_);
+  const ComparedUnit unit = UnitOfComparison(ItemOf(simulated, point.simulated.item), units_);
   comparison.unit = unit.text;
-  problem = ReadSeries(simulated_, point.simulated.item, unit, comparison.simulated, progress.Part(0, 0.5));
+  problem = ReadSeries(simulated, point.simulated.item, unit, comparison.simulated, progress.Part(0, 0.5));
   if (problem.empty())
     problem = ReadSeries(observed, point.observed.item, unit, comparison.observed, progress.Part(0.5, 1));
   if (!problem.empty()) return comparison;

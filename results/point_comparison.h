@@ -44,8 +44,8 @@ struct PointComparison {
   bool isUnreadable = false;  ///< A file could not be opened.
 };
 
-/// Compares points one after the other. The file of the simulated values stays open while the next point names the same
-/// one. Figures are in the user's unit of what was simulated.
+/// Compares points one after the other. A file stays open while the next point names the same one. Figures are in the
+/// user's unit of what was simulated.
 class PointComparer {
  public:
   PointComparer(const ComparedPeriod& period, const DisplayUnits& units);
@@ -53,12 +53,17 @@ class PointComparer {
   PointComparison Compare(const DetailedPoint& point, ProgressPart progress = {});
 
  private:
-  std::string OpenSimulated(const std::string& path);
+  struct OpenFile {
+    DataFile file;
+    std::optional<std::string> path;
+
+    /// "" or why it cannot be opened.
+    std::string Open(const std::string& wanted);
+  };
 
   std::int64_t start_ = 0, end_ = -1;  ///< Seconds since 1970-01-01.
   const DisplayUnits& units_;
-  DataFile simulated_;
-  std::optional<std::string> openPath_;
+  OpenFile simulated_, observed_;
 };
 
 }  // namespace tervane

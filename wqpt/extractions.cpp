@@ -110,10 +110,4 @@ void CResultsPTPathlineExtractionKvf::ExchangeKeys(KeyExchange& keys) {
   keys.WriteOnly("NumberOfExtractions", GetItemCount());
 }
 
-CResultsPostProcessingKvf::CResultsPostProcessingKvf(CYbSEKvfBase* parent)
-    : CYbSEKvfGroupBase("Post-Processing", "Results_Post_Processing", parent) {
-  NewChild<CResultsPTRegExtractionKvf>();
-  NewChild<CResultsPTPathlineExtractionKvf>();
-}
-
 }  // namespace tervane

@@ -123,11 +123,4 @@ class CResultsPTPathlineExtractionKvf : public ExtractionListKvf<CResultsPTPathl
   void ExchangeKeys(KeyExchange& keys) override;
 };
 
-/// What is done with the results of a run.
-class CResultsPostProcessingKvf : public CYbSEKvfGroupBase {
- public:
-  explicit CResultsPostProcessingKvf(CYbSEKvfBase* parent);
-};
-inline constexpr ImportantName<CResultsPostProcessingKvf> kPostProcessing{"RESULTS_POST_PROCESSING"};
-
 }  // namespace tervane

@@ -10,6 +10,7 @@
 
 #include "document/flow_model_document.h"
 #include "engine/engine_output.h"
+#include "results/result_nodes.h"
 #include "wqpt/extractions.h"
 
 namespace tervane {

@@ -13,6 +13,7 @@
 #include "modelcells/model_layers.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
+#include "results/result_catalogue_file.h"
 #include "simspec/model_components.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"
@@ -111,6 +112,15 @@ TEST_F(EngineProgram, PutsQuantitiesOnTheCellsOfTheDomain) {
   kvfGetParam(kvfSectionByNameNum(kvfTargetByNameNum(report, "Extra_Data", 1), "Topography", 1), "ItemNo", &item, 1, 1);
   EXPECT_EQ(item, 2);
   kvfClose(&report);
+
+  // What it made is listed among the results, by what it is.
+  StoredItems stored;
+  EXPECT_EQ(ReadStoredItems(folder.File("a_results/a.tvdres"), true, stored), "");
+  ASSERT_GE(stored.items.size(), 2U);
+  EXPECT_EQ(stored.items[1].name, "Input: Topography");
+  EXPECT_EQ(stored.items[1].path, file);
+  EXPECT_EQ(stored.items[1].item, 2);
+  EXPECT_FALSE(stored.area.IsUndefined());
 }
 
 TEST_F(EngineProgram, TellsCellsWithoutValueAndZonesByName) {

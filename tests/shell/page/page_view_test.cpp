@@ -215,6 +215,7 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
       add(kSetupDataTree);
       // What the preprocessor left is the same of all setups.
       if (sections == kSetups[0]) add(kProcessedDataTree);
+      if (sections == kSetups[0]) add(kResultsTree);
       paths.emplace_back("CCoverageKvf");
       for (const std::string& path : paths) {
         SCOPED_TRACE(path + " at " + std::to_string(zoom));

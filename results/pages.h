@@ -1,0 +1,14 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The pages of results, by the names under which a shell knows them.
+#pragma once
+
+#include "core/page_class.h"
+
+namespace tervane {
+
+inline constexpr PageClass kResultViewerPage{"CResultViewerDlg", 0};
+inline constexpr PageClass kRunStatisticsPage{"CRunStatisticsDlg", 0};
+
+}  // namespace tervane

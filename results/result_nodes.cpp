@@ -1,0 +1,33 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "results/result_nodes.h"
+
+#include "wqpt/extractions.h"
+
+namespace tervane {
+
+CResultViewerKvf::CResultViewerKvf(CYbSEKvfBase* parent)
+    : ResultPageKvf("Gridded Data Results Viewer", "ResultViewer", kResultViewerPage, parent) {}
+
+void CResultViewerKvf::ExchangeKeys(KeyExchange& keys) { keys("LayerNo", LayerNo); }
+
+CResultKvf::CResultKvf(CYbSEKvfBase* parent) : CYbSEKvfGroupBase("Simulation Results", "Result", parent) {
+  NewChild<CResultViewerKvf>();
+}
+
+CRunStatisticsKvf::CRunStatisticsKvf(CYbSEKvfBase* parent)
+    : ResultPageKvf("Simulation Statistics", "RunStatistics", kRunStatisticsPage, parent) {}
+
+void CRunStatisticsKvf::ExchangeKeys(KeyExchange& keys) {
+  keys("HtmlFilename", HtmlFilename);
+  keys("ShapeFilename", ShapeFilename);
+}
+
+CResultsPostProcessingKvf::CResultsPostProcessingKvf(CYbSEKvfBase* parent)
+    : CYbSEKvfGroupBase("Post-Processing", "Results_Post_Processing", parent) {
+  NewChild<CRunStatisticsKvf>();
+  NewChild<CResultsPTRegExtractionKvf>();
+  NewChild<CResultsPTPathlineExtractionKvf>();
+}
+
+}  // namespace tervane
