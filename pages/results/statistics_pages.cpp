@@ -30,7 +30,7 @@ Series OverTime(const std::string& name, const PointSeries& source, const std::s
   Series series;
   series.name = name;
   series.unit = unit;
-  series.isStepped = source.valueType == ValueType::MeanStep || source.valueType == ValueType::StepAccumulated;
+  // Lines alone: filled steps would hide each other.
   series.color = color;
   for (std::size_t i = 0; i < source.stamps.size(); ++i) {
     series.times.push_back(CYbDateTime::FromSecondsSinceEpoch(source.stamps[i]));
@@ -153,8 +153,8 @@ std::shared_ptr<TableOf<PointStatistics>> CRunStatisticsDlg::PointTable() {
   table->ItemName("Point");
   table->ShowOnly();
   table->ReportCurrentRow();
-  table->Value("Name", [](PointStatistics& row) { return row.point.name; }).Width(150);
-  table->Value("Data type", [](PointStatistics& row) { return row.point.dataType; }).Width(170);
+  table->Value("Name", [](PointStatistics& row) { return row.point.name; }).Width(190);
+  table->Value("Data type", [](PointStatistics& row) { return row.point.dataType; }).Width(100);
   table
       ->Value("Layer",
               [](PointStatistics& row) -> CellValue {
@@ -178,7 +178,7 @@ std::shared_ptr<TableOf<PointStatistics>> CRunStatisticsDlg::PointTable() {
                   if (!value) return std::string();
                   return *value;
                 })
-        .Width(70)
+        .Width(56)
         .Format("%.4g")
         .ToolTip(toolTip);
   };
@@ -204,9 +204,9 @@ void CRunStatisticsDlg::Describe(PageForm& form) {
   form.Notice([this] { return problem_.empty() ? outcome_ : problem_; });
   table_ = PointTable();
   form.Table(table_);
-  form.Report([this] { return Node().HtmlFilename.Absolute(); });
-  form.Choice("Compare as:", view_, {"Series over time", "Scatter with the 1:1 line", "Duration curves"})
+  form.Choice("Show point as:", view_, {"Series over time", "Scatter with the 1:1 line", "Duration curves"})
       .Hint(kViewOnly);
+  form.Report([this] { return Node().HtmlFilename.Absolute(); });
   form.Chart([this] { return Chart(); });
 }
 
