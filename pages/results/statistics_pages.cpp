@@ -4,12 +4,13 @@
 
 #include <algorithm>
 #include <cmath>
+#include <utility>
 
 #include <fmt/format.h>
 
 #include "document/flow_model_document.h"
 #include "forms/plots.h"
-#include "platform/file_cache.h"
+#include "platform/files.h"
 #include "platform/paths.h"
 #include "results/result_nodes.h"
 #include "results/statistics_report.h"
@@ -121,6 +122,8 @@ class CRunStatisticsDlg : public PageOf<CRunStatisticsKvf> {
   void ReadPoints();
   void Run();
   void Take(const StatisticsTable& table);
+  /// Lets the figures follow the dates and the report.
+  void FollowFigures(Awaited& awaited);
   SeriesContent Chart();
   DisplayUnits Units() const { return Context().displayUnits ? *Context().displayUnits : DisplayUnits(); }
 
@@ -132,15 +135,27 @@ class CRunStatisticsDlg : public PageOf<CRunStatisticsKvf> {
   std::string outcome_;  ///< Of the latest run on this page.
   int view_ = kOverTime;
 
-  /// What the shown comparison was made of, and the comparison.
-  struct Asked {
+  /// What figures were made of, besides the points.
+  struct FiguresAsked {
+    ComparedPeriod period;
+    DisplayUnits units;
+    FileStamp report;
+
+    bool operator==(const FiguresAsked&) const = default;
+  } figuresAsked_;
+  /// Makes the figures of all points beside the window, and writes nothing.
+  std::shared_ptr<Computed<StatisticsTable>> figures_;
+  bool areTaken_ = false;
+
+  /// What the shown comparison was made of.
+  struct ComparisonAsked {
     DetailedPoint point;
     ComparedPeriod period;
     DisplayUnits units;
     std::vector<FileStamp> files;
 
-    bool operator==(const Asked&) const = default;
-  } asked_;
+    bool operator==(const ComparisonAsked&) const = default;
+  } comparisonAsked_;
   std::shared_ptr<ComparisonComputation> comparison_;
 };
 
@@ -153,7 +168,9 @@ std::shared_ptr<TableOf<PointStatistics>> CRunStatisticsDlg::PointTable() {
   table->ItemName("Point");
   table->ShowOnly();
   table->ReportCurrentRow();
-  table->Value("Name", [](PointStatistics& row) { return row.point.name; }).Width(190);
+  table->Value("Name", [](PointStatistics& row) { return row.point.name; })
+      .Width(190)
+      .ToolTipOf([](PointStatistics& row) { return row.problem; });
   table->Value("Data type", [](PointStatistics& row) { return row.point.dataType; }).Width(100);
   table
       ->Value("Layer",
@@ -161,15 +178,15 @@ std::shared_ptr<TableOf<PointStatistics>> CRunStatisticsDlg::PointTable() {
                 if (row.point.layer < 1) return std::string();
                 return row.point.layer;
               })
-      .Width(50);
-  table->Value("Unit", [](PointStatistics& row) { return row.unit; }).Width(60);
+      .Width(45);
+  table->Value("Unit", [](PointStatistics& row) { return row.unit; }).Width(45);
   table
       ->Value("Pairs",
               [](PointStatistics& row) -> CellValue {
                 if (row.figures.pairs == 0) return std::string();
                 return static_cast<int>(row.figures.pairs);
               })
-      .Width(60);
+      .Width(45);
   const auto figure = [&table](const char* head, std::optional<double> RunStatistics::*member, const char* toolTip) {
     table
         ->Value(head,
@@ -178,7 +195,7 @@ std::shared_ptr<TableOf<PointStatistics>> CRunStatisticsDlg::PointTable() {
                   if (!value) return std::string();
                   return *value;
                 })
-        .Width(56)
+        .Width(64)
         .Format("%.4g")
         .ToolTip(toolTip);
   };
@@ -190,7 +207,6 @@ std::shared_ptr<TableOf<PointStatistics>> CRunStatisticsDlg::PointTable() {
   figure("R2", &RunStatistics::nashSutcliffe, "Efficiency of Nash and Sutcliffe");
   figure("KGE", &RunStatistics::klingGupta, "Efficiency of Kling and Gupta");
   figure("PBIAS [%]", &RunStatistics::percentBias, "Percent bias; above 0 where the simulated values are too low");
-  table->Value("Remark", [](PointStatistics& row) { return row.problem; }).Width(220);
   return table;
 }
 
@@ -204,6 +220,10 @@ void CRunStatisticsDlg::Describe(PageForm& form) {
   form.Notice([this] { return problem_.empty() ? outcome_ : problem_; });
   table_ = PointTable();
   form.Table(table_);
+  form.Notice([this] {
+    const PointStatistics* shown = table_->Current();
+    return shown && !shown->problem.empty() ? fmt::format("{}: {}.", shown->point.name, shown->problem) : std::string();
+  });
   form.Choice("Show point as:", view_, {"Series over time", "Scatter with the 1:1 line", "Duration curves"})
       .Hint(kViewOnly);
   form.Report([this] { return Node().HtmlFilename.Absolute(); });
@@ -278,13 +298,29 @@ void CRunStatisticsDlg::Take(const StatisticsTable& table) {
     if (rows_[i]->point == table.rows[i].point) *rows_[i] = table.rows[i];
 }
 
+void CRunStatisticsDlg::FollowFigures(Awaited& awaited) {
+  FiguresAsked asked{period_, Units(), readStamp_};
+  if (!figures_ || !(asked == figuresAsked_)) {
+    figuresAsked_ = std::move(asked);
+    areTaken_ = false;
+    std::vector<DetailedPoint> points;
+    for (const auto& row : rows_) points.push_back(row->point);
+    figures_ = std::make_shared<Computed<StatisticsTable>>(
+        "Comparing simulated with observed series",
+        [points, period = period_, units = Units()](StatisticsTable& table, ProgressPart progress) {
+          return ComputeStatistics(points, period, units, table, progress);
+        });
+  }
+  if (const auto table = NowOrAwaited(figures_, awaited); table && !std::exchange(areTaken_, true)) Take(*table);
+}
+
 SeriesContent CRunStatisticsDlg::Chart() {
   const PointStatistics* shown = table_->Current();
   if (!shown) return {.series = {}, .period = {}, .message = "There is no point to show."};
   const DetailedPoint& point = shown->point;
-  Asked asked{point, period_, Units(), {StampOf(point.simulated.path), StampOf(point.observed.path)}};
-  if (!comparison_ || !(asked == asked_)) {
-    asked_ = std::move(asked);
+  ComparisonAsked asked{point, period_, Units(), {StampOf(point.simulated.path), StampOf(point.observed.path)}};
+  if (!comparison_ || !(asked == comparisonAsked_)) {
+    comparisonAsked_ = std::move(asked);
     comparison_ = std::make_shared<ComparisonComputation>(
         "Reading " + point.name,
         [point, period = period_, units = Units()](PointComparison& comparison, ProgressPart progress) {
@@ -294,6 +330,7 @@ SeriesContent CRunStatisticsDlg::Chart() {
   }
   Awaited awaited;
   const auto comparison = NowOrAwaited(comparison_, awaited);
+  FollowFigures(awaited);
   SeriesContent chart = comparison ? ChartOf(*comparison, view_, period_) : SeriesContent();
   chart.awaited = std::move(awaited);
   return chart;

@@ -444,9 +444,14 @@ int TableView::WidthOf(int column) const {
   QFont bold = view_->font();
   bold.setBold(true);
   int width = QFontMetrics(bold).horizontalAdvance(ToQt(table.Head(column)));
-  for (int row = 1; row <= std::min(table.RowCount(), kLookedAt); ++row)
-    width = std::max(width, icon + metrics.horizontalAdvance(ToQt(table.ShownCell(row, column))));
-  return std::min(width + padding, 2 * declared);
+  bool isAny = false;
+  for (int row = 1; row <= std::min(table.RowCount(), kLookedAt); ++row) {
+    const QString text = ToQt(table.ShownCell(row, column));
+    isAny = isAny || !text.isEmpty();
+    width = std::max(width, icon + metrics.horizontalAdvance(text));
+  }
+  // What is still to come has the room that it was given.
+  return isAny ? std::min(width + padding, 2 * declared) : std::max(width + padding, declared);
 }
 
 int TableView::WidthOfHeadWords(int column) const {
