@@ -42,7 +42,7 @@ void AddItems(KvfNode* section, std::vector<StoredItem>& items) {
 }
 
 /// By whom a catalogue was written, where it tells that; empty for one that cannot be read.
-std::string EngineOf(const std::string& path) {
+std::string WriterOf(const std::string& path) {
   std::string engine;
   KvfFile* file = kvfLoadFile(path, 0);
   if (kvfGetErrorGlb() == kKvfNoError)
@@ -110,7 +110,7 @@ std::string ReadStoredItems(const std::string& path, bool clears, StoredItems& s
 }
 
 std::string WriteStoredItems(const std::string& path, const StoredItems& stored, const std::string& engine) {
-  if (FileExists(path) && EngineOf(path) != engine)
+  if (FileExists(path) && WriterOf(path) != engine)
     return fmt::format("{} is the catalogue of another engine, and stays as it is", path);
   const std::string folder(FolderOf(path));
   KvfFile* file = kvfCreate();
