@@ -4,6 +4,7 @@
 
 #include <QCheckBox>
 #include <QDialog>
+#include <QMenu>
 #include <QPlainTextEdit>
 #include <QScrollArea>
 #include <QTextBrowser>
