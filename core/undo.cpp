@@ -181,6 +181,24 @@ void UndoStack::Restore(CYbSEKvfBase& node, const State& state) {
 
 // ---- Steps
 
+void UndoStack::Merge(Step& step, std::vector<Change> changes) {
+  for (Change& change : changes) {
+    const auto same = std::find_if(step.changes.begin(), step.changes.end(),
+                                   [&](const Change& other) { return other.node == change.node; });
+    if (same == step.changes.end())
+      step.changes.push_back(std::move(change));
+    else
+      same->after = std::move(change.after);
+  }
+}
+
+bool UndoStack::Join() {
+  std::vector<Change> changes = TakeChanges();
+  if (changes.empty()) return false;
+  if (CanUndo()) Merge(steps_[done_ - 1], std::move(changes));
+  return true;
+}
+
 bool UndoStack::Commit(const std::string& name, const void* source, Time now, StepPlace place) {
   std::vector<Change> changes = TakeChanges();
   if (changes.empty()) return false;
@@ -193,14 +211,7 @@ bool UndoStack::Commit(const std::string& name, const void* source, Time now, St
     Step& last = steps_.back();
     last.time = now;
     last.state = ++lastState_;
-    for (Change& change : changes) {
-      const auto same = std::find_if(last.changes.begin(), last.changes.end(),
-                                     [&](const Change& other) { return other.node == change.node; });
-      if (same == last.changes.end())
-        last.changes.push_back(std::move(change));
-      else
-        same->after = std::move(change.after);
-    }
+    Merge(last, std::move(changes));
     return true;
   }
   steps_.push_back({name, source, now, std::move(place), ++lastState_, std::move(changes)});

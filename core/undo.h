@@ -17,6 +17,9 @@ namespace tervane {
 
 class LinkHolder;
 
+/// A bit in the hint of a change: it follows from the latest step and is a part of it, as of `UndoStack::Join`.
+inline constexpr int kFollowsFromStep = 128;
+
 /// Where a user has made a step: on a node's page, in the control of that name there; either may be unknown.
 struct StepPlace {
   std::uint64_t node = 0;  ///< Its serial number.
@@ -42,6 +45,11 @@ class UndoStack {
   /// control) that follow each other within a second are one.
   bool Commit(const std::string& name, const void* source = nullptr, Time now = std::chrono::steady_clock::now(),
               StepPlace place = {});
+
+  /// Takes what changed since the last call as a part of the latest step that is done, whose consequence it is: what
+  /// can no longer be and goes when somebody looks. Without a step it is no change of the user's. False when nothing
+  /// did.
+  bool Join();
 
   bool CanUndo() const { return done_ > 0; }
   bool CanRedo() const { return done_ < steps_.size(); }
@@ -94,6 +102,8 @@ class UndoStack {
     std::unique_ptr<State> state;
   };
 
+  /// Adds changes to those of a step.
+  static void Merge(Step& step, std::vector<Change> changes);
   /// Knows a node and all below it, behind what `known` holds.
   void Learn(CYbSEKvfBase& node, std::vector<Known>& known);
   /// What keeps a node alive; null where its parent does not hold it.

@@ -12,6 +12,7 @@
 #include "platform/os.h"
 #include "platform/paths.h"
 #include "platform/text.h"
+#include "results/grid_series.h"
 
 namespace tervane {
 
@@ -150,6 +151,11 @@ void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& act
     document_->Root().Validate();
   else
     node.Validate();
+  if (hint & kFollowsFromStep) {
+    undo_->Join();
+    if (listener_) listener_(hint);
+    return;
+  }
   // A value that validation mends belongs to the step that made it wrong. What undo does not know of, such as the
   // custom result folder, counts as a change all the same.
   if (!undo_->Commit(action, source, std::chrono::steady_clock::now(), {node.Serial(), std::move(control)}))
@@ -236,6 +242,9 @@ bool EditSession::SaveAs(const std::string& path) {
     std::swap(lock_, lock);
     readOnlyReason_.clear();
   }
+  // What the file no longer holds is gone here, too.
+  if (auto* gridSeries = document_->Root().Important(kOutputGridSeries); gridSeries && gridSeries->RefreshItems())
+    undo_->Join();
   undo_->MarkSaved();
   recovered_ = false;
   formerPath_.clear();

@@ -15,6 +15,7 @@
 #include "execution/processed_data.h"
 #include "overlays/overlays.h"
 #include "results/result_nodes.h"
+#include "results/storing.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/extra_params.h"
 #include "simspec/introduction.h"
@@ -92,6 +93,7 @@ constexpr std::array kChildren{
     Child<CSatZoneSubCatchmentKvf>(kReservoirZone),
     ChildRow{MakeBy<NewGroundwaterTable>, {}},
     Child<CSourcesWQListKvf>(kSources),
+    Child<CStoringResultsKvf>(kStoringResults),
     Child<COutputModKvf>(),
     Child<CExtraParamsKvf>(),
     Child<CExecuteEngineFlagsKvf>(kExecuteFlags),
@@ -108,8 +110,6 @@ constexpr std::array kChildren{
 
 /// Read behind all others, in this order: species must stand before everything that keeps a list per species.
 constexpr std::array<std::string_view, 3> kReadBehind{kSpecies.text, kProcesses.text, kOverland.text};
-/// In files of version 1 read by the basic parameters, inside their section.
-constexpr std::string_view kStoringResults = "STORINGRESULTS";
 /// Setups of older versions keep the paved areas here, which now belong to overland flow.
 constexpr std::string_view kLandUseSection = "LandUse";
 constexpr int kFirstVersionOfPondedDrainage = 14;
@@ -134,8 +134,9 @@ void CGlobal::Load(KvfNode* parentSection) {
     const bool isReadBehind = std::any_of(kReadBehind.begin(), kReadBehind.end(),
                                           [&](std::string_view name) { return child == GetImportantNode(name); }) ||
                               child == GetImportantNode(kUnsaturatedZone.text);
-    // From the second child on the version of the file is known.
-    const bool wasReadBefore = child == GetImportantNode(kStoringResults) && ReadDocVersion() == 1;
+    // From the second child on the version of the file is known. In one of version 1 the basic parameters have read the
+    // storing of results, inside their section.
+    const bool wasReadBefore = child == GetImportantNode(kStoringResults.text) && ReadDocVersion() == 1;
     if (!isReadBehind && !wasReadBefore) child->Load(target);
   }
   for (const std::string_view name : kReadBehind)

@@ -9,6 +9,7 @@
 #include <fmt/format.h>
 
 #include "data/datafile_request.h"
+#include "forms/file_browse.h"
 #include "forms/page_form.h"
 #include "spatial/file_nodes.h"
 
@@ -30,40 +31,7 @@ std::string PeriodText(const TimeAxis& time) {
   return fmt::format("{} to {}", time.Start().Format(kDay), time.End().Format(kDay));
 }
 
-/// Asks for a file and one of its items; false when the user gave up or nothing in it will do.
-bool BrowseDataFile(DataFileNode& node, Host::FileQuestion question, Host& host) {
-  const std::string folder = node.GetRoot() ? node.GetRoot()->SetupFolder() : std::string();
-  question.current = node.File.IsEmpty() ? folder : node.File.Absolute();
-  const auto path = host.AskFileToOpen(question);
-  if (!path) return false;
-  const auto file = DataFileFactsOf(*path);
-  if (!file->error.empty()) {
-    host.ShowMessage(file->error, Host::Icon::Error);
-    return false;
-  }
-  Host::ItemQuestion items;
-  items.title = "Choose an item";
-  items.file = *path;
-  items.heads = {"Item", "Quantity", "Unit", "Period", "Steps", "Size"};
-  const DataFileRequest request = node.SelectionRequest();
-  for (std::size_t i = 0; i < file->items.size(); ++i) {
-    const DataItem& item = file->items[i];
-    const ItemType* type = FindItemType(item.itemType);
-    const int number = static_cast<int>(i) + 1;
-    items.rows.push_back({{item.name, std::string(type ? type->name : "unknown"), item.unitText,
-                           item.hasTime ? PeriodText(file->time) : "at all times",
-                           fmt::format("{}", item.hasTime ? file->time.steps : 1), SizeText(item)},
-                          WhyNotMet(*file, std::array{number}, request)});
-    if (items.current < 0 && items.rows.back().refusal.empty()) items.current = static_cast<int>(i);
-  }
-  const auto chosen = host.AskItem(items);
-  if (!chosen) return false;
-  node.File = FileName::Picked(*path, folder);
-  node.Items = {*chosen + 1};
-  return true;
-}
-
-/// The same for a shape file and one of its attributes; without a demand for one the file alone is chosen.
+/// Asks for a shape file and one of its attributes; without a demand for one the file alone is chosen.
 bool BrowseShapeFile(CData2DShpFile& node, Host::FileQuestion question, Host& host) {
   const std::string folder = node.GetRoot() ? node.GetRoot()->SetupFolder() : std::string();
   question.current = node.File.IsEmpty() ? folder : node.File.Absolute();
@@ -105,6 +73,38 @@ void ChooseAttribute(CData2DShpFile& node) {
 }
 
 }  // namespace
+
+bool BrowseDataFile(DataFileNode& node, Host::FileQuestion question, Host& host) {
+  const std::string folder = node.GetRoot() ? node.GetRoot()->SetupFolder() : std::string();
+  question.current = node.File.IsEmpty() ? folder : node.File.Absolute();
+  const auto path = host.AskFileToOpen(question);
+  if (!path) return false;
+  const auto file = DataFileFactsOf(*path);
+  if (!file->error.empty()) {
+    host.ShowMessage(file->error, Host::Icon::Error);
+    return false;
+  }
+  Host::ItemQuestion items;
+  items.title = "Choose an item";
+  items.file = *path;
+  items.heads = {"Item", "Quantity", "Unit", "Period", "Steps", "Size"};
+  const DataFileRequest request = node.SelectionRequest();
+  for (std::size_t i = 0; i < file->items.size(); ++i) {
+    const DataItem& item = file->items[i];
+    const ItemType* type = FindItemType(item.itemType);
+    const int number = static_cast<int>(i) + 1;
+    items.rows.push_back({{item.name, std::string(type ? type->name : "unknown"), item.unitText,
+                           item.hasTime ? PeriodText(file->time) : "at all times",
+                           fmt::format("{}", item.hasTime ? file->time.steps : 1), SizeText(item)},
+                          WhyNotMet(*file, std::array{number}, request)});
+    if (items.current < 0 && items.rows.back().refusal.empty()) items.current = static_cast<int>(i);
+  }
+  const auto chosen = host.AskItem(items);
+  if (!chosen) return false;
+  node.File = FileName::Picked(*path, folder);
+  node.Items = {*chosen + 1};
+  return true;
+}
 
 Control& PageForm::DataFile(std::string label, DataFileNode& file) {
   Control& control = File(std::move(label), file.File);

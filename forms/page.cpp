@@ -6,6 +6,7 @@
 
 #include <fmt/format.h>
 
+#include "core/undo.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -24,7 +25,7 @@ void CYbSEDlgBase::Initialize() {
   // undone would come again.
   if (!context_.updateDoc || context_.isReplacement) return;
   for (const PageForm::Mend& each : form_->Mends())
-    if (each.mend()) UpdateDoc(kDataChanged, each.action);
+    if (each.mend()) UpdateDoc(kDataChanged | (each.action.empty() ? kFollowsFromStep : 0), each.action);
 }
 
 void CYbSEDlgBase::UpdateDoc(int hint, const std::string& action, const void* source) const {

@@ -269,8 +269,11 @@ class PageForm {
   void MendWhenShown(std::string action, std::function<bool()> mend) {
     mends_.push_back({std::move(action), std::move(mend)});
   }
+  /// The same for what follows from what the user did before: a part of the latest step, and no change of his where
+  /// there is none.
+  void FollowWhenShown(std::function<bool()> mend) { mends_.push_back({{}, std::move(mend)}); }
   struct Mend {
-    std::string action;
+    std::string action;  ///< Empty for what follows from the latest step.
     std::function<bool()> mend;
   };
   const std::vector<Mend>& Mends() const { return mends_; }

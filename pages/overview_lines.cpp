@@ -41,7 +41,7 @@ class PageLines {
 
  private:
   void AddValue(const Control& control) {
-    const std::string label = SpokenLabel(control.label);
+    const std::string label = NameOf(control);
     switch (control.kind) {
       case ControlKind::Check:
         return AddLine(label, control.Text() == "1" ? "on" : "off");

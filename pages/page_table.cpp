@@ -4,7 +4,9 @@
 
 #include "pages/document/document_pages.h"
 #include "pages/execution/processed_pages.h"
+#include "pages/results/detailed_series_pages.h"
 #include "pages/results/statistics_pages.h"
+#include "pages/results/storing_pages.h"
 #include "pages/results/viewer_pages.h"
 #include "pages/simspec/components_pages.h"
 #include "pages/simspec/control_pages.h"
@@ -85,6 +87,8 @@ constexpr PageFile kFiles[] = {
     {"wqpt", KinetraPages},
     {"wqpt", ParticlePages},
     {"execution", ProcessedPages},
+    {"results", StoringPages},
+    {"results", DetailedSeriesPages},
     {"results", ViewerPages},
     {"results", StatisticsPages},
 };

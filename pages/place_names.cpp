@@ -36,12 +36,17 @@ std::string CalledBy(const KeyFacts& facts, const std::string& key) {
   return facts.label.empty() ? key : SpokenLabel(facts.label);
 }
 
+std::string NameOf(const Control& control) {
+  // A number whose label is a control of its own, since it follows another rule, tells it in its tool tip.
+  return SpokenLabel(control.label.empty() && control.kind == ControlKind::Number ? control.toolTip : control.label);
+}
+
 /// What the controls of a page are called: by their labels, without one by that of the control in front in the row.
 class PlaceNames::Labels {
  public:
   void Look(PageForm& form) {
     form.ForEach([this](const Control& control) {
-      const std::string own = SpokenLabel(control.label);
+      const std::string own = NameOf(control);
       if (!own.empty()) before_ = own;
       if (control.key.empty() || !control.node) return;
       // A choice without a label belongs to what stands in front of it in its row.

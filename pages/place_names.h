@@ -12,6 +12,8 @@
 
 namespace tervane {
 
+class Control;
+
 /// Places of a setup in the words of its trees and pages: "Model Domain and Grid > Filename". What was once looked up
 /// is kept, so that it is to be made anew when nodes have changed.
 class PlaceNames {
@@ -48,5 +50,7 @@ std::string CalledBy(const KeyFacts& facts, const std::string& key);
 
 /// A label as it is spoken of: without its colon, in one line.
 std::string SpokenLabel(std::string_view label);
+/// What a control is called, without the marks of a label.
+std::string NameOf(const Control& control);
 
 }  // namespace tervane

@@ -8,6 +8,12 @@
 
 namespace tervane {
 
+inline constexpr PageClass kStoringResultsPage{"CStoringResultsDlg", 0};
+inline constexpr PageClass kGridSeriesPage{"COutputGridSeriesListDlg", 0};
+inline constexpr PageClass kDetailedSeriesPage{"CDetailedTSOutputDlg", 0};
+inline constexpr PageClass kDetailedRiverSeriesPage{"CDetailedFvrTSOutputDlg", 0};
+inline constexpr PageClass kDetailedResultPage{"CResultDetailedTSDlg", 0};
+inline constexpr PageClass kDetailedRiverResultPage{"CResultFvrDetailedTSDlg", 0};
 inline constexpr PageClass kResultViewerPage{"CResultViewerDlg", 0};
 inline constexpr PageClass kRunStatisticsPage{"CRunStatisticsDlg", 0};
 

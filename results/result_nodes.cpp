@@ -6,13 +6,29 @@
 
 namespace tervane {
 
+namespace {
+
+constexpr DetailedResultKvf::Kind kDetailedResult{"CResultDetailedTSKvf", "Tervane Detailed Time Series",
+                                                  "ResultDetailedTS", kDetailedResultPage};
+constexpr DetailedResultKvf::Kind kDetailedRiverResult{"CResultFvrDetailedTSKvf", "Detailed River Time Series",
+                                                       "ResultFvrDetailedTS", kDetailedRiverResultPage};
+
+}  // namespace
+
+DetailedResultKvf::DetailedResultKvf(const Kind& kind, CYbSEKvfBase* parent)
+    : ResultPageKvf(kind.title, kind.section, kind.page, parent) {
+  SetClassName(kind.className);
+}
+
 CResultViewerKvf::CResultViewerKvf(CYbSEKvfBase* parent)
     : ResultPageKvf("Gridded Data Results Viewer", "ResultViewer", kResultViewerPage, parent) {}
 
 void CResultViewerKvf::ExchangeKeys(KeyExchange& keys) { keys("LayerNo", LayerNo); }
 
 CResultKvf::CResultKvf(CYbSEKvfBase* parent) : CYbSEKvfGroupBase("Simulation Results", "Result", parent) {
+  NewChild<DetailedResultKvf>(kDetailedResult);
   NewChild<CResultViewerKvf>();
+  NewChild<DetailedResultKvf>(kDetailedRiverResult);
 }
 
 CRunStatisticsKvf::CRunStatisticsKvf(CYbSEKvfBase* parent)

@@ -21,6 +21,19 @@ class ResultPageKvf : public CTvnKvfBase {
   const PageClass& page_;
 };
 
+/// What a run tells of its series at points, on a page in HTML that engines write.
+class DetailedResultKvf : public ResultPageKvf {
+ public:
+  /// The class, the title and the section of a page; a constant.
+  struct Kind {
+    std::string_view className;
+    const char* title;
+    const char* section;
+    const PageClass& page;
+  };
+  DetailedResultKvf(const Kind& kind, CYbSEKvfBase* parent);
+};
+
 /// Which of its layers a result is shown with, when it is handed to the result viewer.
 class CResultViewerKvf : public ResultPageKvf {
  public:

@@ -90,6 +90,24 @@ section LandUse {
     }
   }
 }
+section StoringOfResults {
+  section DetailedTimeseriesOutput {
+    NumberOfItems = 1
+    section Item_1 {
+    }
+  }
+  section DetailedFvrTimeseriesOutput {
+    NumberOfItems = 1
+    section Item_1 {
+    }
+  }
+  section GridSeriesOutput {
+    NumberOfItems = 1
+    section Item_1 {
+      DataType = 10
+    }
+  }
+}
 section ExtraParams {
   NoOfParams = 2
   section ExtraParam_1 {
@@ -134,6 +152,8 @@ bool IsDerived(const std::string& key) {
                               ":RS_6", ":RS_7", "Source1:TYPE",
                               // What a solver of Modflow is told of other keys.
                               ":IPRPCG", ":INEWT", ":IDMPBOT", "PCG4:MUTPCG", ":IPCALC",
+                              // A type that the setup cannot store.
+                              "GridSeriesOutput/Item_1:DataType",
                               // A kind of value that the file's value has not.
                               "ExtraParam_1:Type", "ExtraParam_2:Type",
                               // A zero area and an area of which the file says that it is undefined are the same.
