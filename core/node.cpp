@@ -28,11 +28,21 @@ CYbSEKvfBase::CYbSEKvfBase(std::string title, std::string sectionName, CYbSEKvfB
     : parent_(parent),
       root_(parent ? parent->root_ : nullptr),
       serial_(nextSerial++),
-      sectionName_(std::move(sectionName)),
-      title_(std::move(title)) {}
+      sectionName_(std::move(sectionName)) {
+  if (!title.empty()) SetTexts(std::move(title), {});
+}
 
 CYbSEKvfBase::~CYbSEKvfBase() {
   if (isImportant_ && root_ && root_ != this) root_->UnregisterNode(this);
+}
+
+void CYbSEKvfBase::SetTexts(std::string title, std::string abbreviatedTitle) {
+  title_ = std::move(title);
+  abbreviatedTitle_ = std::move(abbreviatedTitle);
+  StateFingerprint fingerprint;
+  fingerprint.Put(title_);
+  fingerprint.Put(abbreviatedTitle_);
+  textsNumber_ = fingerprint.Number();
 }
 
 // ---- Tree

@@ -131,11 +131,11 @@ class CYbSEKvfBase {
   // ---- Texts
 
   virtual const std::string& GetTitle() const { return title_; }
-  virtual void SetTitle(std::string title) { title_ = std::move(title); }
+  virtual void SetTitle(std::string title) { SetTexts(std::move(title), std::move(abbreviatedTitle_)); }
   /// Name of the node's class; that of its type unless the node is one of several rows of one type.
   std::string ClassName() const;
   virtual const std::string& GetAbbreviatedTitle() const { return abbreviatedTitle_; }
-  virtual void SetAbbreviatedTitle(std::string title) { abbreviatedTitle_ = std::move(title); }
+  virtual void SetAbbreviatedTitle(std::string title) { SetTexts(std::move(title_), std::move(title)); }
   void SetHelp(std::string helpFile, std::string page);
   /// The page name given to `SetHelp`.
   const std::string& GetHtml() const { return helpPage_; }
@@ -235,6 +235,7 @@ class CYbSEKvfBase {
   int ValidateAs(bool takesPart);
   /// Adds the findings for values that their keys do not allow.
   void CheckValues();
+  void SetTexts(std::string title, std::string abbreviatedTitle);
   friend class CYbSEKvfGlobalBase;
   friend class UndoStack;
 
@@ -265,6 +266,7 @@ class CYbSEKvfBase {
   } oldSection_;  ///< Without a name where the section had always the same.
   const PageClass* setupPage_ = nullptr;
   std::string title_, abbreviatedTitle_;
+  std::uint64_t textsNumber_ = 0;  ///< A number of both, so that undo need not read them.
 };
 
 /// A node that is meant to hold further nodes.

@@ -14,10 +14,34 @@
 
 namespace tervane {
 
+/// Puts what is made of several values one after the other. `State` puts numbers and texts.
+template <class State>
+class PutsParts {
+ public:
+  void Put(const FileName& value) {
+    Self().Put(value.Text());
+    Self().Put(value.Folder());
+  }
+  void Put(const CYbDateTime& value) {
+    for (const int field : {value.Year(), value.Month(), value.Day(), value.Hour(), value.Minute(), value.Second()})
+      Self().Put(field);
+  }
+  template <class Value>
+  void Put(const std::vector<Value>& values) {
+    Self().Put(values.size());
+    for (const Value& value : values) Self().Put(value);
+  }
+
+ private:
+  State& Self() { return static_cast<State&>(*this); }
+};
+
 /// A number of all values that are put, as they are in a `StateBuffer`. A single value that changes always gives
 /// another number; of several at a time one in 2^64 cases would not.
-class StateFingerprint {
+class StateFingerprint : public PutsParts<StateFingerprint> {
  public:
+  using PutsParts::Put;
+
   std::uint64_t Number() const { return number_; }
   void Clear() { number_ = 0; }
 
@@ -44,19 +68,6 @@ class StateFingerprint {
       for (const char* place = begin; place < end; ++place) Put(*place);
     }
   }
-  void Put(const FileName& value) {
-    Put(value.Text());
-    Put(value.Folder());
-  }
-  void Put(const CYbDateTime& value) {
-    for (const int field : {value.Year(), value.Month(), value.Day(), value.Hour(), value.Minute(), value.Second()})
-      Put(field);
-  }
-  template <class Value>
-  void Put(const std::vector<Value>& values) {
-    Put(values.size());
-    for (const Value& value : values) Put(value);
-  }
 
  private:
   template <class Number>
@@ -71,8 +82,10 @@ class StateFingerprint {
 
 /// Values one behind the other as bytes: what a node holds, kept while the program runs. They are taken out in the
 /// order in which they were put.
-class StateBuffer {
+class StateBuffer : public PutsParts<StateBuffer> {
  public:
+  using PutsParts::Put;
+
   StateBuffer() = default;
   explicit StateBuffer(std::string bytes) : bytes_(std::move(bytes)) {}
 
@@ -93,19 +106,6 @@ class StateBuffer {
   void Put(const std::string& value) {
     Put(value.size());
     bytes_ += value;
-  }
-  void Put(const FileName& value) {
-    Put(value.Text());
-    Put(value.Folder());
-  }
-  void Put(const CYbDateTime& value) {
-    for (const int field : {value.Year(), value.Month(), value.Day(), value.Hour(), value.Minute(), value.Second()})
-      Put(field);
-  }
-  template <class Value>
-  void Put(const std::vector<Value>& values) {
-    Put(values.size());
-    for (const Value& value : values) Put(value);
   }
 
   template <class Number>

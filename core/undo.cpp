@@ -14,12 +14,8 @@ namespace tervane {
 
 namespace {
 
-/// Puts all of a node's state that is no key and no child.
-void PutTexts(const std::string& title, const std::string& abbreviatedTitle, std::size_t plainChildren,
-              const LinkHolder* links, auto& state) {
-  state.Put(title);
-  state.Put(abbreviatedTitle);
-  state.Put(plainChildren);
+/// Puts what a node's entry of a list is linked with.
+void PutLinks(const LinkHolder* links, auto& state) {
   if (!links) return;
   const std::vector<void*> addresses = links->Links();
   state.Put(addresses.size());
@@ -69,7 +65,10 @@ std::shared_ptr<CYbSEKvfBase> UndoStack::OwnerOf(const CYbSEKvfBase& node) {
 UndoStack::State UndoStack::StateOf(const Known& known) const {
   CYbSEKvfBase& node = *known.node;
   StateBuffer state;
-  PutTexts(node.title_, node.abbreviatedTitle_, node.plainChildren_, known.links, state);
+  state.Put(node.title_);
+  state.Put(node.abbreviatedTitle_);
+  state.Put(node.plainChildren_);
+  PutLinks(known.links, state);
   KeyExchange keys = KeyExchange::Keeping(state);
   node.ExchangeState(keys);
   return {state.Bytes(), node.children_};
@@ -80,7 +79,9 @@ std::uint64_t UndoStack::FingerprintOf(const Known& known) {
   fingerprint_.Clear();
   fingerprint_.Put(node.children_.size());
   for (const auto& child : node.children_) fingerprint_.Put(child.get());
-  PutTexts(node.title_, node.abbreviatedTitle_, node.plainChildren_, known.links, fingerprint_);
+  fingerprint_.Put(node.textsNumber_);
+  fingerprint_.Put(node.plainChildren_);
+  PutLinks(known.links, fingerprint_);
   node.ExchangeState(fingerprinting_);
   return fingerprint_.Number();
 }
@@ -90,16 +91,15 @@ std::vector<UndoStack::Change> UndoStack::TakeChanges() {
   std::vector<std::size_t> rearranged;
   // The node far ahead, and what hangs at the one near by, which has come by now.
   const auto askFor = [this](std::size_t place) {
-    constexpr std::size_t kFar = 8, kNear = 3, kFront = 64, kTexts = 64, kUsualValues = 128, kUsualChildren = 64;
+    constexpr std::size_t kFar = 8, kNear = 3, kFront = 64, kUsualValues = 128, kUsualChildren = 64;
     if (place + kFar < known_.size()) {
       const CYbSEKvfBase* node = known_[place + kFar].node;
       AskFor(node, kFront);
-      AskFor(reinterpret_cast<const char*>(node) + sizeof(CYbSEKvfBase) - kTexts, kTexts + kUsualValues);
+      AskFor(&node->textsNumber_, sizeof node->textsNumber_ + kUsualValues);
     }
     if (place + kNear < known_.size()) {
       const CYbSEKvfBase& node = *known_[place + kNear].node;
       if (!node.children_.empty()) AskFor(node.children_.data(), kUsualChildren);
-      AskFor(node.title_.data(), 1);
     }
   };
   // Also what was taken out of the tree is met: it may have changed on its way out, when its links were cut.
@@ -165,8 +165,10 @@ void UndoStack::Restore(CYbSEKvfBase& node, const State& state) {
   // What comes back has the findings that it left with.
   for (CYbSEKvfBase* above = &node; above; above = above->parent_) above->isClear_ = false;
   StateBuffer bytes(state.bytes);
-  bytes.Take(node.title_);
-  bytes.Take(node.abbreviatedTitle_);
+  std::string title, abbreviatedTitle;
+  bytes.Take(title);
+  bytes.Take(abbreviatedTitle);
+  node.SetTexts(std::move(title), std::move(abbreviatedTitle));
   bytes.Take(node.plainChildren_);
   auto* holder = dynamic_cast<LinkHolder*>(&node);
   std::vector<std::uintptr_t> addresses;
