@@ -242,23 +242,6 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
     return item;
   }
 
-  void AddItemNode() override {
-    Nodes::AddItemNode();
-    Item* item = this->GetItem(this->GetItemCount());
-    item->SetName(NewName(*item));
-    LinkNewItem(item);
-  }
-
-  void InsertItem(int number, int level) override {
-    const bool inserts = level == 1 && this->GetItemNode(number);
-    Nodes::InsertItem(number, level);
-    if (!inserts) return;
-    Item* item = this->GetItem(number);
-    item->SetName(NewName(*item));
-    LinkNewItem(item);
-    BringDependentsTo(*item, number);
-  }
-
   void DeleteItem(int number, int level) override {
     if (Item* item = level == 1 ? this->GetItem(number) : nullptr) {
       UnlinkItem(*item);
@@ -328,6 +311,14 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
   void RefreshDependents() override {
     for (auto* dependent : this->DependentLists()) dependent->RefreshDependents();
     this->Notify(0, nullptr);
+  }
+
+ protected:
+  void BeginItem(int number) override {
+    Item* item = this->GetItem(number);
+    item->SetName(NewName(*item));
+    LinkNewItem(item);
+    if (number < this->GetItemCount()) BringDependentsTo(*item, number);
   }
 
  private:

@@ -90,12 +90,14 @@ void CYbSEKvfListBaseInterface::DeleteItem(int number, int level) {
 
 void CYbSEKvfListBaseInterface::InsertItem(int number, int level) {
   if (level != 1) return ForwardToItems(level, [number](auto& list, int below) { list.InsertItem(number, below); });
-  if (GetItemNode(number)) {
+  const bool inserts = GetItemNode(number) != nullptr;
+  if (inserts) {
     const auto place = static_cast<std::ptrdiff_t>(plainChildren_) + number - 1;
     children_.insert(children_.begin() + place, NewItemNode());
     if (GetHasBeenTouched() == level) TouchAllChildren();
   }
   for (const auto& [list, listLevel] : syncedLists_) list->InsertItem(number, listLevel);
+  if (inserts) BeginItem(number);
 }
 
 bool CYbSEKvfListBaseInterface::SwapItems(int number, int other, int level,

@@ -39,8 +39,11 @@ class CYbSEKvfListBaseInterface : public CYbSEKvfBase {
 
   int GetItemCount() const { return static_cast<int>(children_.size() - plainChildren_); }
   CYbSEKvfBase* GetItemNode(int number) const;
-  /// Appends an item.
-  virtual void AddItemNode() { SetItemCount(GetItemCount() + 1, 1); }
+  /// Appends an item of the user's.
+  void AddItemNode() {
+    SetItemCount(GetItemCount() + 1, 1);
+    BeginItem(GetItemCount());
+  }
   /// Makes an item with this list as its parent; not added to the list.
   virtual std::unique_ptr<CYbSEKvfBase> NewItemNode() = 0;
 
@@ -64,6 +67,11 @@ class CYbSEKvfListBaseInterface : public CYbSEKvfBase {
   void ReadItemCount(KvfNode* section, std::string_view key);
 
   static constexpr std::string_view kItemCountKey = "YbSEKvfListItemCount";
+
+ protected:
+  /// Gives a new item of the user's what it begins with: it was appended or inserted, and stands at its place. An item
+  /// for a section of a file, or for a count, is none.
+  virtual void BeginItem(int /*number*/) {}
 
  private:
   struct NodeInListOfSyncedLists {

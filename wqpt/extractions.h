@@ -38,19 +38,9 @@ class ExtractionListKvf : public CYbSEKvfListBase<Item> {
     counter_ = 0;
   }
 
-  void AddItemNode() override {
-    CYbSEKvfListBase<Item>::AddItemNode();
-    GiveName(this->GetItemCount());
-  }
-  void InsertItem(int number, int level) override {
-    const bool inserts = level == 1 && this->GetItemNode(number);
-    CYbSEKvfListBase<Item>::InsertItem(number, level);
-    if (inserts) GiveName(number);
-  }
-
  private:
   /// One pass over all rows but the last; a name that was passed is not looked at again.
-  void GiveName(int number) {
+  void BeginItem(int number) override {
     ++counter_;
     for (int row = 1; row < this->GetItemCount(); ++row)
       if (this->GetItem(row)->Name == kBase + std::to_string(counter_)) ++counter_;

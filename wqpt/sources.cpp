@@ -141,21 +141,10 @@ std::string CSourcesWQListKvf::GetItemName(int number) const {
   return item ? item->SourceName : std::string();
 }
 
-void CSourcesWQListKvf::BeginWithFirstSpecies(CSourceWQItemKvf& source) const {
+void CSourcesWQListKvf::BeginItem(int number) {
   const auto* species = Important(kSpecies);
   const CSpeciesItemKvf* first = species ? species->GetItem(1) : nullptr;
-  if (first && first->Type != CSpeciesItemKvf::kFixed) source.Species = first->GetName();
-}
-
-void CSourcesWQListKvf::AddItemNode() {
-  CYbSEKvfListBase::AddItemNode();
-  BeginWithFirstSpecies(*GetItem(GetItemCount()));
-}
-
-void CSourcesWQListKvf::InsertItem(int number, int level) {
-  const bool inserts = level == 1 && GetItemNode(number);
-  CYbSEKvfListBase::InsertItem(number, level);
-  if (inserts) BeginWithFirstSpecies(*GetItem(number));
+  if (first && first->Type != CSpeciesItemKvf::kFixed) GetItem(number)->Species = first->GetName();
 }
 
 }  // namespace tervane

@@ -75,13 +75,11 @@ class CSourcesWQListKvf : public CYbSEKvfListBase<CSourceWQItemKvf>, public CYbS
   explicit CSourcesWQListKvf(CYbSEKvfBase* parent);
 
   std::string GetItemName(int number) const override;
-  /// A new source is of the first species, unless that has no defined phase.
-  void BeginWithFirstSpecies(CSourceWQItemKvf& source) const;
-  void AddItemNode() override;
-  void InsertItem(int number, int level) override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("NumberOfSources", *this); }
+  /// A new source is of the first species, unless that has no defined phase.
+  void BeginItem(int number) override;
 };
 inline constexpr ImportantName<CSourcesWQListKvf> kSources{"SOURCES"};
 

@@ -40,13 +40,7 @@ CWQLayerListKvf::CWQLayerListKvf(CYbSEKvfBase* parent) : NamedListKvf("Water Qua
   SetItemCount(1, 1);
 }
 
-void CWQLayerListKvf::AddItemNode() {
-  NamedListKvf::AddItemNode();
-  if (auto* templates = Important(kKinetraSpecification)) templates->CompleteLayers();
-}
-
-void CWQLayerListKvf::InsertItem(int number, int level) {
-  NamedListKvf::InsertItem(number, level);
+void CWQLayerListKvf::BeginItem(int /*number*/) {
   if (auto* templates = Important(kKinetraSpecification)) templates->CompleteLayers();
 }
 

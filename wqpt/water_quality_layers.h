@@ -19,12 +19,10 @@ class CWQLayerListKvf : public NamedListKvf<CWQLayerItemKvf> {
  public:
   explicit CWQLayerListKvf(CYbSEKvfBase* parent);
 
-  // A layer of the user's is complete at once.
-  void AddItemNode() override;
-  void InsertItem(int number, int level) override;
-
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("NumberOfWQLayers", *this); }
+  /// A layer of the user's is complete at once.
+  void BeginItem(int number) override;
 };
 inline constexpr ImportantName<CWQLayerListKvf> kWaterQualityLayers{"WATERQUALITYLAYERS"};
 
