@@ -133,10 +133,12 @@ void KeyExchange::Lines(std::string_view countKey, std::string_view key, std::ve
     return;
   }
   kvfPutParam(file_, countKey, static_cast<int>(lines.size()));
+  if (keys_) Describe({countKey}, "int", nullptr);
   for (const KeyLine& line : lines) kvfPutListParam(file_, key, "sii", line.text.c_str(), line.first, line.second);
   if (!keys_) return;
-  Describe({countKey}, "int", nullptr);
   Describe({key}, "string, int, int", nullptr);
+  // Without lines, what was written last is their number.
+  if (lines.empty()) keys_->back().defaultValue.clear();
 }
 
 template <class Value>
@@ -154,9 +156,14 @@ void KeyExchange::Repeated(const RepeatedKeys& names, std::vector<Value>& values
   }
   kvfAddSection(file_, names.section);
   kvfPutParam(file_, names.count, static_cast<int>(values.size()));
+  if (keys_) Describe({names.count}, "int", nullptr);
   for (const Value& value : values) kvfPutParam(file_, names.key, value);
+  if (keys_) {
+    Describe({names.key}, std::is_same_v<Value, int> ? "int, repeated" : "string, repeated", &values);
+    if (values.empty()) keys_->back().defaultValue.clear();
+    for (KeyInfo* key : {&keys_->back(), &keys_->back() - 1}) key->section = names.section;
+  }
   kvfEndSection(file_);
-  if (keys_) Describe({names.key}, std::is_same_v<Value, int> ? "int list" : "string list", &values);
 }
 
 template void KeyExchange::Repeated(const RepeatedKeys& names, std::vector<int>& values);

@@ -23,6 +23,7 @@ struct KeyInfo {
   static constexpr int kNoLimit = std::numeric_limits<int>::max();
 
   std::string key;
+  std::string section = {};      ///< The section in the node's own in which it stands; empty for most.
   std::string type;              ///< "int", "float", "double", "bool", "string", "filename", "date", "day".
   std::string defaultValue;      ///< As the file holds it.
   int since = -1;                ///< First document version in which the key is read.

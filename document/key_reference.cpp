@@ -14,13 +14,29 @@ namespace tervane {
 
 namespace {
 
+/// Takes out the keys that stand in sections of their own within the node's.
+std::vector<KeySection> TakeInner(KeySection& section) {
+  std::vector<KeySection> inner;
+  for (const KeyInfo& key : section.keys) {
+    if (key.section.empty()) continue;
+    const std::string path = JoinPath(section.path, PathName(key.section));
+    if (inner.empty() || inner.back().path != path)
+      inner.push_back({path, section.className, section.title, false, {}});
+    inner.back().keys.push_back(key);
+  }
+  std::erase_if(section.keys, [](const KeyInfo& key) { return !key.section.empty(); });
+  return inner;
+}
+
 void Describe(CYbSEKvfBase& node, const std::string& parentPath, std::vector<KeySection>& sections) {
   const std::string& name = node.GetSectionName();
   const std::string path = name.empty() ? parentPath : JoinPath(parentPath, PathName(name));
   auto* list = dynamic_cast<CYbSEKvfListBaseInterface*>(&node);
   KeySection section{path, ClassNameOf(node), node.GetTitle(), list != nullptr, {}};
   node.DescribeKeys(section.keys);
+  std::vector<KeySection> inner = TakeInner(section);
   if (!name.empty() || !section.keys.empty()) sections.push_back(std::move(section));
+  std::ranges::move(inner, std::back_inserter(sections));
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
     Describe(*child, path, sections);
   // All items are alike: one that is not in the list stands for them.

@@ -108,6 +108,19 @@ section StoringOfResults {
     }
   }
 }
+section Results_Post_Processing {
+  section PT_Reg_Extraction {
+    YbSEKvfListItemCount = 1
+    section Extraction_1 {
+      section WellNames {
+        wellname = "North"
+      }
+      section SinkCodes {
+        sinkcode = 3
+      }
+    }
+  }
+}
 section ExtraParams {
   NoOfParams = 2
   section ExtraParam_1 {
@@ -250,6 +263,9 @@ TEST(KeyReference, TellsInWhichVersionsAnOldKeyIsRead) {
   EXPECT_EQ(find("SimSpec/CompControlParaTimeStep", "MaxAllowedOLTimeStep").since, 10);
   EXPECT_EQ(find("ExtraParams/ExtraParam_%d", "Name").type, "string");
   EXPECT_EQ(find("SimSpec/SimulationPeriod", "SIMSTART").type, "date");
+  // Values one behind the other, in a section of their own.
+  EXPECT_EQ(find("Results_Post_Processing/PT_Reg_Extraction/Extraction_%d/WellNames", "wellname").type,
+            "string, repeated");
   // Stations and zones are known though a new setup has none.
   EXPECT_EQ(find("Climate/PrecipitationRate/TIME_SERIES_%d", "Elevation").type, "float");
   EXPECT_EQ(find("Climate/SNOWMELTCONST", "Threshold").until, 10);
