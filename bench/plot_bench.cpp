@@ -285,6 +285,43 @@ void MeasureSeries() {
   Report("the same: see that nothing changed", MedianOf([&] { plot.Show(content); }), 16, "ms");
 }
 
+/// As a page of stress periods shows the series that drive the model.
+void MeasurePanels() {
+  constexpr int kPanels = 100;
+  constexpr std::int64_t kValues = 10'000;
+  SeriesContent content;
+  for (int panel = 0; panel < kPanels; ++panel) {
+    Series& series = content.series.emplace_back();
+    series.panel = panel;
+    series.name = fmt::format("Well {}", panel + 1);
+    series.unit = "m³/s";
+    for (std::int64_t i = 0; i < kValues; ++i) {
+      series.times.push_back(CYbDateTime(1990, 1, 1) + CYbDateTimeSpan{86400 * i});
+      series.values.push_back(50 + 40 * std::sin(static_cast<double>(i + 100 * panel) / 90));
+    }
+    content.panelTitles.push_back(series.name);
+  }
+  for (int marker = 0; marker < 100; ++marker)
+    content.markers.push_back(
+        {.name = std::to_string(marker + 1), .time = CYbDateTime(1990, 1, 1) + CYbDateTimeSpan{86400 * 100 * marker}});
+  NobodyToAsk host;
+  SeriesPlot plot(host);
+  plot.resize({kSize.width(), kPanels * 100 + 54});
+  plot.show();
+  QApplication::processEvents();
+  Report("100 charts of 10,000 values below each other: until the first picture", Milliseconds([&] {
+           plot.Show(content);
+           plot.Chart().replot();
+         }),
+         200, "ms");
+  Report("the same: a marked date is moved, until it is seen", MedianOf([&] {
+           content.markers[7].time = content.markers[7].time + CYbDateTimeSpan{86400};
+           plot.Show(content);
+           plot.Chart().replot();
+         }),
+         50, "ms");
+}
+
 void Measure() {
   MeasureMap("25 million cells", 0, false);
   MeasureMap("25 million cells, turned", 20, false);
@@ -294,6 +331,7 @@ void Measure() {
   MeasureInterpolation();
   MeasureViewer();
   MeasureSeries();
+  MeasurePanels();
 }
 
 }  // namespace

@@ -26,7 +26,7 @@ void FurtherSeries::AddTo(SeriesContent& chart) {
     chosen.series = RecentSeries(chosen.offer.path, chosen.offer.item);
     const auto data = NowOrAwaited(chosen.series, chart.awaited);
     if (!data && !chosen.series->IsDone()) continue;
-    Series& added = chart.series.emplace_back(data ? *data : Series());
+    Series& added = data ? chart.series.emplace_back(*data) : chart.series.emplace_back();
     added.name = data ? chosen.offer.name : fmt::format("{} (cannot be read)", chosen.offer.name);
     added.color = chosen.color;
   }

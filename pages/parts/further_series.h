@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-#include "forms/plots.h"
+#include "pages/parts/plot_content.h"
 #include "spatial/file_nodes.h"
 
 namespace tervane {
@@ -28,7 +28,7 @@ class FurtherSeries {
   struct Chosen {
     SeriesOffer offer;
     std::size_t color = 0;
-    std::shared_ptr<Computed<Series>> series;  ///< As it was last asked for.
+    std::shared_ptr<Computed<FileSeries>> series;  ///< As it was last asked for.
   };
 
   std::vector<SeriesOffer> AllOffers() const;

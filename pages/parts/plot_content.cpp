@@ -12,7 +12,6 @@
 #include "geometry/grid_outline.h"
 #include "overlays/overlays.h"
 #include "pages/parts/river_map.h"
-#include "platform/item_types.h"
 #include "platform/paths.h"
 #include "simspec/periods.h"
 #include "spatial/domain.h"
@@ -22,6 +21,12 @@ namespace tervane {
 namespace {
 
 constexpr std::size_t kMostValues = 2'000'000;
+
+/// How much of a large file the data are, so that a chart of a hundred small series keeps them all.
+double ShareOfFile(const auto& /*data*/) { return 1; }
+double ShareOfFile(const FileSeries& series) {
+  return std::max(static_cast<double>(series.times.size()) / static_cast<double>(kMostValues), 1 / 128.0);
+}
 
 /// What was read from files lately, shared by all pages: asked for at every change of a page, read once.
 template <class Key, class Data>
@@ -56,16 +61,20 @@ class RecentFiles {
   /// Forgets what has not been asked for for the longest time. What is in use needs its memory anyway, and a map of
   /// many files would never be complete if they drove each other out.
   void LetGo() {
-    std::size_t count = 0;
-    std::erase_if(entries_, [&](const Entry& entry) { return !entry.IsInUse() && ++count > kMostFiles; });
+    double files = 0;
+    std::erase_if(entries_, [&](const Entry& entry) {
+      if (entry.IsInUse()) return false;
+      files += entry.result->Result() ? ShareOfFile(*entry.result->Result()) : 0;
+      return files > kMostFiles;
+    });
   }
 
-  static constexpr std::size_t kMostFiles = 8;
+  static constexpr double kMostFiles = 8;
   std::deque<Entry> entries_;
 };
 
 /// The values of an item over all times.
-FileResult ReadSeries(const std::string& path, int number, Series& series, ProgressPart progress) {
+FileResult ReadSeries(const std::string& path, int number, FileSeries& series, ProgressPart progress) {
   DataFile file;
   const auto refused = [](std::string reason) { return FileResult{std::move(reason), {}}; };
   if (std::string problem = file.Open(path); !problem.empty()) return refused(std::move(problem));
@@ -80,6 +89,8 @@ FileResult ReadSeries(const std::string& path, int number, Series& series, Progr
     return refused(std::move(problem));
   series.name = item.name;
   series.unit = ShortUnitOf(item);
+  series.itemType = item.itemType;
+  series.scale = item.scale;
   series.isStepped = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
   for (std::size_t step = 0; step < values.size(); ++step) {
     series.times.push_back(file.Time().Stamp(step));
@@ -232,11 +243,23 @@ MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit) {
   return map;
 }
 
-std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item) {
-  static RecentFiles<FileKey, Series> files;
-  return files.Get({path, {StampOf(path)}, item, {}, {}}, path, [path, item](Series& series, ProgressPart progress) {
-    return ReadSeries(path, item, series, progress);
-  });
+std::shared_ptr<Computed<FileSeries>> RecentSeries(const std::string& path, int item) {
+  static RecentFiles<FileKey, FileSeries> files;
+  return files.Get(
+      {path, {StampOf(path)}, item, {}, {}}, path,
+      [path, item](FileSeries& series, ProgressPart progress) { return ReadSeries(path, item, series, progress); });
+}
+
+Series InUserUnit(const FileSeries& series, const DisplayUnits* units) {
+  Series shown = series;
+  const ItemType* const type = series.itemType == quantity::kUndefined ? nullptr : FindItemType(series.itemType);
+  if (!type || !series.scale) return shown;
+  const Unit& unit = units ? units->UnitOf(*type) : BaseUnit(*type);
+  const auto conversion = ConversionBetween(*series.scale, unit.scale);
+  if (!conversion) return shown;
+  for (double& value : shown.values) value = (*conversion)(value);
+  shown.unit = unit.abbreviation;
+  return shown;
 }
 
 SeriesContent FileChart(const DataFileNode& node) {

@@ -10,6 +10,8 @@
 #include "data/datafile.h"
 #include "data/grid_files.h"
 #include "forms/plots.h"
+#include "platform/item_types.h"
+#include "platform/units.h"
 #include "spatial/file_nodes.h"
 
 namespace tervane {
@@ -32,8 +34,17 @@ void AddDomainOutline(const CYbSEKvfBase& node, MapContent& map);
 /// A chart of the selected item of a file of series, with the simulation's period.
 SeriesContent FileChart(const DataFileNode& file);
 
+/// A series of a file as it stands there, and what its values are.
+struct FileSeries : Series {
+  int itemType = quantity::kUndefined;
+  std::optional<UnitScale> scale = {};  ///< Of its unit; nothing when nobody knows it.
+};
+
 /// The values of a series of a file over time.
-std::shared_ptr<Computed<Series>> RecentSeries(const std::string& path, int item);
+std::shared_ptr<Computed<FileSeries>> RecentSeries(const std::string& path, int item);
+/// The series in the user's unit of its quantity, the base unit without `units`; as it stands in the file where that
+/// tells no quantity.
+Series InUserUnit(const FileSeries& series, const DisplayUnits* units);
 
 /// The unit of an item's values in short, "mm/day"; as the file says it where it is none of ours.
 std::string ShortUnitOf(const DataItem& item);

@@ -110,7 +110,8 @@ void CStressPeriodsDlg::AskEnd(Item& period) {
 
 SeriesContent CStressPeriodsDlg::Chart() const {
   CStressPeriodsKvf& n = Node();
-  SeriesContent chart = DrivingSeriesChart(n, n.StressPeriodRadio == CStressPeriodsKvf::kPlotForEachType);
+  SeriesContent chart =
+      DrivingSeriesChart(n, n.StressPeriodRadio == CStressPeriodsKvf::kPlotForEachType, Context().displayUnits);
   chart.markers.reserve(static_cast<std::size_t>(n.GetItemCount()));
   for (int number = 1; number <= n.GetItemCount(); ++number) {
     Item& period = *n.GetItem(number);

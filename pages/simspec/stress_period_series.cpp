@@ -44,7 +44,7 @@ std::vector<DrivingSeries> DrivingSeriesOf(const CYbSEKvfBase& node) {
   return all;
 }
 
-SeriesContent DrivingSeriesChart(const CYbSEKvfBase& node, bool isLumped) {
+SeriesContent DrivingSeriesChart(const CYbSEKvfBase& node, bool isLumped, const DisplayUnits* units) {
   SeriesContent chart;
   if (const auto* period = node.Important(kSimulationPeriod))
     chart.period = {period->GetSimStartDate(), period->SIMEND};
@@ -56,7 +56,7 @@ SeriesContent DrivingSeriesChart(const CYbSEKvfBase& node, bool isLumped) {
     if (!data) continue;
     const std::string& title = isLumped ? driving.source : driving.title;
     if (!isLumped || chart.panelTitles.empty() || chart.panelTitles.back() != title) chart.panelTitles.push_back(title);
-    Series& series = chart.series.emplace_back(*data);
+    Series& series = chart.series.emplace_back(InUserUnit(*data, units));
     series.name = driving.title;
     series.panel = static_cast<int>(chart.panelTitles.size()) - 1;
   }

@@ -16,14 +16,13 @@ struct DrivingSeries {
   std::string title;   ///< Of its own, "Precipitation - Station 1".
   std::string path;
   int item = 1;
-  int itemType = 0;  ///< The quantity of its values where its file does not tell.
 };
 
 /// Those of precipitation and evapotranspiration that take part, and what is pumped from wells.
 std::vector<DrivingSeries> DrivingSeriesOf(const CYbSEKvfBase& node);
 
-/// A chart of the series below each other over the time of the simulation, each in a chart of its own, or all of one
-/// source in one chart.
-SeriesContent DrivingSeriesChart(const CYbSEKvfBase& node, bool isLumped);
+/// A chart of the series in the user's units, below each other over the time of the simulation, each in a chart of its
+/// own, or all of one source in one chart.
+SeriesContent DrivingSeriesChart(const CYbSEKvfBase& node, bool isLumped, const DisplayUnits* units);
 
 }  // namespace tervane

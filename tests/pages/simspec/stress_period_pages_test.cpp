@@ -43,6 +43,7 @@ class StressPeriodPage : public testing::Test {
                           changes.push_back(action);
                           document.Root().Validate();
                         }};
+    context.displayUnits = &units;
     page = tervane::MakePage(pageClass, node, context);
   }
   void ShowProperties(int engine) {
@@ -74,6 +75,7 @@ class StressPeriodPage : public testing::Test {
   std::vector<std::string> changes;
   CFlowModelDoc document;
   CStressPeriodsKvf& periods = *document.Root().Important(kStressPeriods);
+  DisplayUnits units;
   std::unique_ptr<CYbSEDlgBase> page;
 };
 
@@ -150,6 +152,10 @@ TEST_F(StressPeriodPage, SeriesThatDriveTheModelStandBelowEachOther) {
   document.Root().Important(kWells)->Filename = FileName(folder.File("none.WEL"), "");
   EXPECT_THAT(Chart().panelTitles, ElementsAre("Precipitation"));
   EXPECT_EQ(Chart().series.front().values.size(), 3U);
+  EXPECT_EQ(Chart().series.front().unit, "mm/day");
+  ASSERT_TRUE(units.Choose(quantity::kPrecipitationRate, 2000));
+  EXPECT_EQ(Chart().series.front().unit, "m/s");
+  EXPECT_DOUBLE_EQ(Chart().series.front().values.back(), 0.003 / 86400);
   EXPECT_EQ(Chart().period->second, CYbDateTime(2000, 2, 1));
 }
 
