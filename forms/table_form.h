@@ -192,6 +192,12 @@ class TableForm {
   }
   /// Makes a row the current one; false where that changes nothing for anybody.
   bool Choose(int row);
+  /// The rows in which a view has selected cells.
+  void Select(int first, int last) { selectedFirst_ = first, selectedLast_ = last; }
+  /// The first of the selected rows, 0 for none; the current one where the selection has left it.
+  int FirstSelected() const {
+    return selectedFirst_ <= current_ && current_ <= selectedLast_ ? selectedFirst_ : current_;
+  }
 
   // Many cells at once, as in a spreadsheet: rows of cells that tabs separate. Buttons are passed over.
 
@@ -263,6 +269,7 @@ class TableForm {
   std::string toAllRows_;
   std::function<void(int)> chosen_;
   bool reportsCurrent_ = false;
+  int selectedFirst_ = 0, selectedLast_ = 0;
   const TableColumn* sortedBy_ = nullptr;
   bool isDescending_ = false;
   std::string filter_;

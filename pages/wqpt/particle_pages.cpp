@@ -52,9 +52,9 @@ class ExtractionListDlg : public PageOf<List> {
     form.Table(table_);
     form.Button("Run Selected",
                 [this] {
-                  if (Item* item = table_->Current()) Extract(*this, kind, this->Node().GetNumberWhatIs(item));
+                  if (const int row = table_->FirstSelected()) Extract(*this, kind, row);
                 })
-        .ToolTip("Saves the setup and extracts what the current row tells");
+        .ToolTip("Saves the setup and extracts what the first selected row tells");
     form.Button("Run All", [this] { Extract(*this, kind, -1); })
         .Beside()
         .ToolTip("Saves the setup and extracts what all rows tell");

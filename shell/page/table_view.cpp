@@ -170,7 +170,11 @@ void TableView::ConnectView() {
     if (!isFitting_ && (QApplication::mouseButtons() & Qt::LeftButton) && view_->horizontalHeader()->underMouse())
       areColumnsTheUsers_ = true;
   });
-  connect(view_->selectionModel(), &QItemSelectionModel::selectionChanged, this, &TableView::SyncButtons);
+  connect(view_->selectionModel(), &QItemSelectionModel::selectionChanged, this, [this] {
+    const auto cells = Selected();
+    control_.table->Select(cells ? cells->firstRow : 0, cells ? cells->lastRow : 0);
+    SyncButtons();
+  });
   connect(view_->selectionModel(), &QItemSelectionModel::currentChanged, this,
           [this](const QModelIndex& current, const QModelIndex& before) {
             isSelectedByHead_ = false;

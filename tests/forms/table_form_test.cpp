@@ -39,6 +39,17 @@ class ExtraParamsTable : public testing::Test {
   PageDriver page{document, "ExtraParams"};
 };
 
+TEST_F(ExtraParamsTable, TheFirstSelectedRowIsTheCurrentOneWhereTheSelectionHasLeftIt) {
+  EXPECT_EQ(Table().FirstSelected(), 0);
+  Fill("abcd");
+  Table().Choose(3);
+  EXPECT_EQ(Table().FirstSelected(), 3);
+  Table().Select(2, 3);
+  EXPECT_EQ(Table().FirstSelected(), 2);
+  Table().Choose(4);
+  EXPECT_EQ(Table().FirstSelected(), 4);
+}
+
 TEST_F(ExtraParamsTable, RowsAreInsertedDeletedAndMovedAsAWhole) {
   using Operation = int (TableForm::*)(int, int);
   struct Case {
