@@ -3,6 +3,7 @@
 #include <gmock/gmock.h>
 
 #include "cli/command_line.h"
+#include "platform/files.h"
 #include "tests/support/command_outcome.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
@@ -50,6 +51,25 @@ TEST(GroundCommands, ASectionIsATableOverItsLine) {
   EXPECT_EQ(column.status, kDone) << column.err;
   EXPECT_THAT(column.out, HasSubstr("\nSoil,Global,100,,,,1e-05,,,Global,\n"));
   EXPECT_THAT(column.out, HasSubstr("\nLayer,\"Sand, \"\"fine\"\"\",100,80,20,"));
+}
+
+TEST(GroundCommands, AModelOfModflow6IsWrittenWithAnAccountAndReplacesNoOther) {
+  const TempFolder folder;
+  const std::string setup = std::string(TERVANE_SOURCE_DIR) + "/examples/rhone/rhone_modflow.tvd";
+  const std::string model = folder.File("model");
+  const auto exported = Tervane({"export", "modflow6", setup, model});
+  EXPECT_EQ(exported.status, kDone) << exported.err;
+  EXPECT_TRUE(FileExists(model + "/mfsim.nam"));
+  EXPECT_THAT(exported.out, HasSubstr("Recharge"));
+  const auto again = Tervane({"export", "modflow6", setup, model});
+  EXPECT_EQ(again.status, kCouldNot);
+  EXPECT_THAT(again.err, HasSubstr("--force"));
+  const auto json = Tervane({"export", "modflow6", setup, model, "--force", "--binary", "--json"});
+  EXPECT_EQ(json.status, kDone) << json.err;
+  EXPECT_THAT(json.out, HasSubstr("\"fate\""));
+  const std::string bare = folder.Write("bare.tvd", SetupText(14, ""));
+  EXPECT_EQ(Tervane({"export", "modflow6", bare, folder.File("none")}).status, kCouldNot);
+  EXPECT_FALSE(FileExists(folder.File("none/mfsim.nam")));
 }
 
 TEST(GroundCommands, WhatCannotBeCutIsTold) {
