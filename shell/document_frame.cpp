@@ -233,6 +233,17 @@ bool DocumentFrame::GoToPath(const std::string& path) {
   return node && node->GetParent() && GoTo(node->Serial(), parsed.key.name);
 }
 
+bool DocumentFrame::PressButton(const std::string& label) {
+  if (!page_) return false;
+  CYbSEDlgBase& page = page_->Page();
+  Control* button = nullptr;
+  page.Form().ForEach([&](Control& control) {
+    if (control.label == label && control.press && control.IsShown()) button = &control;
+  });
+  if (button) page.Press(*button);
+  return button != nullptr;
+}
+
 bool DocumentFrame::AnswerOnMap(const std::string& answer) {
   const std::size_t equals = answer.find('=');
   if (!page_ || equals == std::string::npos) return false;
@@ -243,16 +254,9 @@ bool DocumentFrame::AnswerOnMap(const std::string& answer) {
     if (numbers.size() == 2) points.push_back({numbers[0].toDouble(&isX), numbers[1].toDouble(&isY)});
     if (!isX || !isY) return false;
   }
-  CYbSEDlgBase& page = page_->Page();
+  if (!PressButton(answer.substr(0, equals))) return false;
   std::optional<MapRequest> request;
-  bool isPressed = false;
-  page.Form().ForEach([&](Control& control) {
-    if (control.label != answer.substr(0, equals) || !control.press || !control.IsShown()) return;
-    page.Press(control);
-    isPressed = true;
-  });
-  if (!isPressed) return false;
-  page.Form().ForEach([&](Control& control) {
+  page_->Page().Form().ForEach([&](Control& control) {
     if (control.kind == ControlKind::Map && control.IsShown() && !request) request = control.map().request;
   });
   const bool isAnswer = request && points.size() >= (request->kind == MapRequest::Kind::Line ? 2U : 1U);

@@ -55,6 +55,8 @@ class DocumentFrame : public QWidget {
   /// Shows a node's page, with the keyboard on the control of that key or label; false when it has no page.
   bool GoTo(std::uint64_t serial, const std::string& control = {});
   bool GoToPath(const std::string& path);
+  /// Presses a button of the page by its label; false where the page shows none.
+  bool PressButton(const std::string& label);
   /// Presses a button of the page and answers its question on the map: "Draw Section=0,0 100,50". False where the page
   /// has no such button, or it asks for something else.
   bool AnswerOnMap(const std::string& answer);

@@ -33,7 +33,7 @@ using namespace tervane;
 
 struct Typed {
   std::vector<std::string> files;
-  std::string page, size, screenshot, appearance;
+  std::string page, size, screenshot, appearance, dialog;
   std::vector<std::string> answers;
   double zoom = 0;
   int delay = -1;
@@ -70,6 +70,27 @@ QImage WithFewColors(const QImage& image) {
     }
   }
   return image.convertToFormat(QImage::Format_Indexed8, table, Qt::ThresholdDither | Qt::AvoidDither);
+}
+
+bool SavePicture(QWidget& widget, const std::string& path) {
+  if (WithFewColors(widget.grab().toImage()).save(ToQt(path))) return true;
+  std::fprintf(stderr, "quarzel: %s cannot be written\n", path.c_str());
+  return false;
+}
+
+/// Presses a button of the page, draws the dialog that it opens, and gives that up.
+int DrawDialog(MainWindow& window, const Typed& typed) {
+  int status = 2;
+  QTimer::singleShot(0, &window, [&] {
+    QWidget* const dialog = QApplication::activeModalWidget();
+    if (!dialog) return;
+    for (int i = 0; i < 3; ++i) QApplication::processEvents();
+    if (SavePicture(*dialog, typed.screenshot)) status = 0;
+    dialog->close();
+  });
+  const bool isPressed = window.Frame() && window.Frame()->PressButton(typed.dialog);
+  if (!isPressed) std::fprintf(stderr, "quarzel: %s: the page has no such button\n", typed.dialog.c_str());
+  return status;
 }
 
 /// Memory that is refused is told, and the program goes on with what it has.
@@ -133,11 +154,8 @@ int Run(const Typed& typed, QApplication& application) {
   tick.start(10);
   while (isBusy() && !deadline.hasExpired()) application.processEvents(QEventLoop::WaitForMoreEvents);
   settle();
-  if (!WithFewColors(window.grab().toImage()).save(ToQt(typed.screenshot))) {
-    std::fprintf(stderr, "quarzel: %s cannot be written\n", typed.screenshot.c_str());
-    return 2;
-  }
-  return 0;
+  if (!typed.dialog.empty()) return DrawDialog(window, typed);
+  return SavePicture(window, typed.screenshot) ? 0 : 2;
 }
 
 }  // namespace
@@ -161,6 +179,7 @@ int main(int argc, char** argv) {
       });
   commandLine.add_option("--appearance", typed.appearance, "light or dark")->check(CLI::IsMember({"light", "dark"}));
   commandLine.add_option("--screenshot", typed.screenshot, "Draw the window into this picture and end");
+  commandLine.add_option("--dialog", typed.dialog, "Draw the dialog that this button of the page opens");
   commandLine
       .add_option("--delay", typed.delay, "Draw it after so many milliseconds, whatever is still being computed")
       ->check(CLI::NonNegativeNumber);
