@@ -33,6 +33,7 @@ class CellAdder {
   std::string ReadLevels(const TotalledBodies& bodies, std::vector<Values>& levels);
   Values WeightsOf(std::size_t layer, const std::vector<Values>& levels, const std::vector<Values>& bodies,
                    const std::vector<Values>& shares) const;
+  double CellArea() const { return domain_.Geometry().cellSize * domain_.Geometry().cellSize; }
 
   const CellTotals& totals_;
   ProgressPart progress_;
@@ -91,7 +92,6 @@ std::string CellAdder::ReadLevels(const TotalledBodies& bodies, std::vector<Valu
 
 Values CellAdder::WeightsOf(std::size_t layer, const std::vector<Values>& levels, const std::vector<Values>& bodies,
                             const std::vector<Values>& shares) const {
-  const double area = domain_.Geometry().cellSize * domain_.Geometry().cellSize;
   Values weights(cells_, 0);
   for (std::size_t cell = 0; cell < cells_; ++cell) {
     const double top = levels[layer][cell], bottom = levels[layer + 1][cell];
@@ -105,7 +105,7 @@ Values CellAdder::WeightsOf(std::size_t layer, const std::vector<Values>& levels
     // What no body holds is not known, but for what rounding leaves.
     constexpr double kClose = 1e-3;
     const bool isHeld = met >= (top - bottom) * (1 - kClose);
-    weights[cell] = isHeld && !std::isnan(top - bottom) ? counted * area : kUnknown;
+    weights[cell] = isHeld && !std::isnan(top - bottom) ? counted * CellArea() : kUnknown;
   }
   return weights;
 }
@@ -133,6 +133,8 @@ std::string CellAdder::Add(CellTotalsResult& result) {
       const Values weights = WeightsOf(layer, levels, bodies, shares);
       for (std::size_t cell = 0; cell < cells_; ++cell) values[cell] *= weights[cell];
     }
+    if (totals_.isForArea)
+      for (double& value : values) value *= CellArea();
     for (const double value : values) {
       if (std::isnan(value))
         ++sum.unknown;

@@ -38,9 +38,9 @@ struct TotalledBodies {
   bool operator==(const TotalledBodies&) const = default;
 };
 
-/// Sums over the cells, one for each layer. Without layers below ground the values of the cells are added; with them a
-/// value is multiplied with the area of the cell, and with the thickness of the layer in each body times the share that
-/// counts there.
+/// Sums over the cells, one for each layer. Without layers below ground the values of the cells are added, where they
+/// hold for an area times that of the cell; with them a value is multiplied with the area of the cell, and with the
+/// thickness of the layer in each body times the share that counts there.
 struct CellTotals {
   struct Layer {
     std::string name;
@@ -55,7 +55,8 @@ struct CellTotals {
   double factor = 1;  ///< From what is added up to the unit.
   DomainSource domain;
   std::vector<Layer> layers;
-  std::size_t layer = 0;  ///< Whose page asks.
+  std::size_t layer = 0;   ///< Whose page asks.
+  bool isForArea = false;  ///< The values hold for a square metre.
   std::optional<TotalledBodies> levels;
   TotalledBodies bodies;
   std::vector<TotalledQuantity> shares;  ///< One for each body.

@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "wqpt/species_entries.h"
 
+#include <fmt/format.h>
+
 #include "platform/units.h"
 #include "simspec/conditions.h"
 #include "wqpt/ground.h"
@@ -11,6 +13,8 @@ namespace tervane {
 namespace {
 
 using Species = CSpeciesItemKvf;
+
+constexpr int kKilogramUnit = 4201, kKilogramPerSquareMetre = 4401;
 
 constexpr EntriesKind kInitialMasses{.section = "InitialMass",
                                      .title = "Initial Mass on ground surface",
@@ -118,6 +122,19 @@ int CInitialMassItem::GetItemType() const {
 COverlandSpeciesKvf::COverlandSpeciesKvf(CYbSEKvfBase* parent)
     : EntriesKvf(kInitialMasses, Component(&CModelCompKvf::WQ) && WaterQualityComponent(&CModelCompWQKvf::OL), parent) {
   FollowMaster();
+}
+
+std::optional<CellTotals> COverlandSpeciesKvf::TotalsOf(CData2DKvf& quantity) const {
+  CellTotals totals;
+  totals.title = fmt::format("Initial mass of {}", quantity.GetTitle());
+  totals.unit = FindUnit(kKilogramUnit)->abbreviation;
+  totals.factor = Convert(1, BaseUnit(*FindItemType(quantity::kMassPerArea)), *FindUnit(kKilogramPerSquareMetre));
+  totals.isForArea = true;
+  totals.domain = AskDomain(*this);
+  const bool hasUnit = quantity.GetItemType() == quantity::kMassPerArea;
+  totals.layers.push_back(
+      {"the model area", AskTotalled(quantity), hasUnit ? quantity.WhyFileNotValid() : "its mass has no unit"});
+  return totals;
 }
 
 // ---- In the soil

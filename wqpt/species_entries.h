@@ -4,6 +4,7 @@
 // What follows the species: initial masses and concentrations, and the coefficients of mass transfer.
 #pragma once
 
+#include "spatial/cell_totals.h"
 #include "wqpt/entries.h"
 #include "wqpt/soil_values.h"
 #include "wqpt/species.h"
@@ -23,9 +24,11 @@ class CInitialMassItem : public NamedEntry<CData2DKvf, CSpeciesItemBase> {
   int GetItemType() const override;
 };
 
-class COverlandSpeciesKvf : public EntriesKvf<CInitialMassItem, CSpeciesListBase> {
+class COverlandSpeciesKvf : public EntriesKvf<CInitialMassItem, CSpeciesListBase>, public TotalsOfQuantities {
  public:
   explicit COverlandSpeciesKvf(CYbSEKvfBase* parent);
+
+  std::optional<CellTotals> TotalsOf(CData2DKvf& quantity) const override;
 };
 
 // ---- In the soil

@@ -126,9 +126,10 @@ SeriesContent CData2DDlg::TotalsChart() {
 
 void CData2DDlg::DescribeTotals(PageForm& form) {
   const TotalsOfQuantities* above = TotalsAbove(Node());
-  if (!above || !above->TotalsOf(Node())) return;
+  const std::optional<CellTotals> totals = above ? above->TotalsOf(Node()) : std::nullopt;
+  if (!totals) return;
   form.Notice([this] { return TotalsNotice(); });
-  form.Chart([this] { return TotalsChart(); }).Caption("Layer by layer");
+  if (!totals->isForArea) form.Chart([this] { return TotalsChart(); }).Caption("Layer by layer");
 }
 
 void CData2DDlg::Describe(PageForm& form) {

@@ -13,6 +13,7 @@
 #include "tests/support/temp_folder.h"
 #include "tests/wqpt/quality_setup.h"
 #include "wqpt/species.h"
+#include "wqpt/species_entries.h"
 
 namespace tervane::initial_totals_test {
 namespace {
@@ -101,6 +102,19 @@ TEST_F(InitialTotals, WhatIsSorbedCountsWithTheBulkDensityOfTheUnits) {
     At(std::string("SaturatedZone/GeoLayersSZ/Layer_") + layer + "/GeoUnit").FixedValue = 7;
   Of(2).FixedValue = 1e-6F;
   EXPECT_THAT(Added(Of(2)).layers[0].sum, DoubleNear(1e-6 * 2000 * 10 * 2e4, 1e-3));
+}
+
+TEST_F(InitialTotals, MassOnTheGroundCountsWithTheAreaOfTheCells) {
+  auto& masses = setup_.At<COverlandSpeciesKvf>("Overland/InitialMass");
+  At("Overland/InitialMass/Species_1").FixedValue = 2;
+  const auto text = [&](int species) {
+    const auto totals = masses.TotalsOf(At("Overland/InitialMass/Species_" + std::to_string(species)));
+    CellTotalsResult result;
+    EXPECT_EQ(AddUpCells(*totals, {}, result).error, "");
+    return TotalsText(*totals, result);
+  };
+  EXPECT_EQ(text(1), "Initial mass of Salt: 40 kg in the model area.");
+  EXPECT_THAT(text(3), HasSubstr("not known in the model area, since its mass has no unit"));
 }
 
 TEST_F(InitialTotals, WhatHasNoTotalSaysWhy) {
