@@ -79,6 +79,8 @@ void CSpeciesItemKvf::ExchangeKeys(KeyExchange& keys) {
 
 int CSpeciesItemKvf::ValidateData() {
   int isValid = 1;
+  if (Trimmed(GetName()).empty())
+    AddWarning("The species has no name, by which processes and sources refer to it", "Name");
   const auto refuse = [&](const char* text, const char* key) {
     AddError(text, key);
     isValid = 0;
