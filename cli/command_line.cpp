@@ -19,6 +19,7 @@
 #include "platform/os.h"
 #include "platform/text.h"
 #include "platform/units.h"
+#include "platform/version.h"
 
 namespace tervane {
 
@@ -139,7 +140,7 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& plai
       "A PATH is section names joined by /, with #n behind a name for the n-th of equal names and :KEY for a key:\n"
       "SimSpec/SimTitle:Title. Exit status: 0 done, 1 findings or differences, 2 could not.");
   app.require_subcommand(1);
-  app.set_version_flag("--version", "tervane 0.1.0");
+  app.set_version_flag("--version", std::string("tervane ") + kProgramVersion);
 
   int status = kDone;
   CommandOffers offers(app, {out, err}, status);

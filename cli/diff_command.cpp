@@ -5,10 +5,10 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
+#include "cli/difference_text.h"
 #include "cli/json.h"
 #include "cli/offers.h"
 #include "cli/setup_file.h"
-#include "document/setup_diff.h"
 
 namespace tervane {
 
@@ -28,7 +28,9 @@ std::string_view KindName(SetupDifference::Kind kind) {
   return {};
 }
 
-std::string Line(const SetupDifference& difference) {
+}  // namespace
+
+std::string DifferenceLine(const SetupDifference& difference) {
   const std::string place =
       difference.key.empty() ? difference.path : fmt::format("{}:{}", difference.path, difference.key);
   const auto value = [](const std::string& text, const std::string& meaning, bool isDefault) {
@@ -50,7 +52,7 @@ std::string Line(const SetupDifference& difference) {
   return {};
 }
 
-std::string Json(const SetupDifference& difference) {
+std::string DifferenceJson(const SetupDifference& difference) {
   const auto optional = [](const std::string& text) { return text.empty() ? std::string() : JsonQuoted(text); };
   return JsonObject({{"path", JsonQuoted(difference.path)},
                      {"key", optional(difference.key)},
@@ -63,6 +65,8 @@ std::string Json(const SetupDifference& difference) {
                      {"toDefault", difference.toDefault ? "true" : ""}});
 }
 
+namespace {
+
 int DiffCommand(const std::string& from, const std::string& to, bool json, Streams streams) {
   CFlowModelDoc a, b;
   if (!OpenSetup(a, from, streams) || !OpenSetup(b, to, streams)) return kCouldNot;
@@ -72,10 +76,10 @@ int DiffCommand(const std::string& from, const std::string& to, bool json, Strea
   const std::vector<SetupDifference> differences = CompareSetups(writtenA.Target(), writtenB.Target(), KeyReference());
   if (json) {
     std::vector<std::string> elements;
-    for (const SetupDifference& difference : differences) elements.push_back(Json(difference));
+    for (const SetupDifference& difference : differences) elements.push_back(DifferenceJson(difference));
     fmt::print(streams.out, "{}\n", JsonObject({{"differences", JsonArray(elements)}}));
   } else {
-    for (const SetupDifference& difference : differences) fmt::print(streams.out, "{}\n", Line(difference));
+    for (const SetupDifference& difference : differences) fmt::print(streams.out, "{}\n", DifferenceLine(difference));
   }
   return differences.empty() ? kDone : kFindings;
 }

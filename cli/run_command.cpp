@@ -10,6 +10,8 @@
 #include "cli/json.h"
 #include "cli/offers.h"
 #include "cli/setup_file.h"
+#include "cli/verify_run.h"
+#include "document/run_inputs.h"
 #include "execution/engine_line.h"
 #include "execution/run_log.h"
 #include "execution/setup_run.h"
@@ -25,6 +27,7 @@ struct RunOptions {
   std::string argument;  ///< "/PP", "/WM", "/WQ", or empty: what the setup says.
   std::string engines;   ///< Folders of engines; may be empty.
   bool json = false;
+  bool verify = false;
 };
 
 constexpr std::chrono::milliseconds kInterval{50};
@@ -66,7 +69,8 @@ void TerminalShell::Start(const CYbSimpleLaunch& launch, bool /*showsProgress*/)
   std::string problem;
   SetupRun run;
   const EnginePlaces places = options_.engines.empty() ? EnginePlaces::Here({}) : EnginePlaces::Only(options_.engines);
-  const std::optional<RunRequest> request = RequestOf(launch, document_.getResultFolder(), places, problem);
+  std::optional<RunRequest> request = RequestOf(launch, document_.getResultFolder(), places, problem);
+  if (request) PreparePassport(document_, *request);
   os::KeepEndRequests();
   if (!request || !run.Start(*request, problem)) {
     Report(run, problem);
@@ -141,6 +145,7 @@ void TerminalShell::Report(const SetupRun& run, const std::string& sentence) {
 }
 
 int RunCommand(const RunOptions& options, Streams streams) {
+  if (options.verify) return VerifyRun(options.file, options.json, streams);
   CFlowModelDoc document;
   if (!OpenSetup(document, options.file, streams)) return kCouldNot;
   TerminalShell shell(document, options, streams);
@@ -169,6 +174,9 @@ void OfferRunCommand(CommandOffers& offers) {
   part("--wq", "/WQ", "Water quality alone").Excludes(preprocessor).Excludes(waterMovement);
   runs.Add("--engines", options->engines,
            "The folder of the engines; without it TERVANE_ENGINES, or engines/ beside the program");
+  runs.AddFlag("--verify", options->verify,
+               "Run nothing: tell what has changed since the run that made the results, in the setup and in the files "
+               "that it names; exit status 1 when something has");
   runs.AddFlag("--json", options->json, "How it ended as JSON; what the engine says goes to the error stream");
 }
 

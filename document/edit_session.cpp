@@ -30,22 +30,6 @@ using OpenKvf = std::unique_ptr<KvfFile, CloseKvf>;
 
 std::string HashText(std::string_view content) { return fmt::format("{:016x}", HashOf(content)); }
 
-/// The first target of that name, made where the file has none.
-KvfSection& TargetOf(KvfFile& file, std::string_view name) {
-  KvfSection* target = AsSection(FindKvfNode(file.top, false, name));
-  return target ? *target : *file.AddSection(file.top, KvfKind::Target, name);
-}
-
-/// The differences in all that a setup's file holds.
-std::vector<SetupDifference> CompareFiles(KvfFile& before, KvfFile& after, std::string_view setup) {
-  std::vector<SetupDifference> differences;
-  for (const std::string_view target : {setup, std::string_view("SYSTEM")})
-    for (SetupDifference& difference :
-         CompareSetups(TargetOf(before, target), TargetOf(after, target), KeyReference::Get()))
-      differences.push_back(std::move(difference));
-  return differences;
-}
-
 }  // namespace
 
 EditSession::EditSession(std::string recoveryFolder) : recoveryFolder_(std::move(recoveryFolder)) {}
@@ -195,9 +179,7 @@ bool EditSession::HasChangesToSave() const {
 }
 
 std::vector<SetupDifference> EditSession::Differences(const CFlowModelDoc& before) const {
-  const std::string& folder = document_->Root().SetupFolder();
-  return CompareFiles(*OpenKvf(before.BuildFile(folder)), *OpenKvf(document_->BuildFile(folder)),
-                      document_->Root().GetTargetName());
+  return CompareDocuments(before, *document_);
 }
 
 // ---- The file

@@ -9,6 +9,7 @@
 #include "core/kvf_writer.h"
 #include "core/list.h"
 #include "core/path.h"
+#include "document/flow_model_document.h"
 
 namespace tervane {
 
@@ -183,6 +184,12 @@ class Comparison {
   const KeyReference& reference_;
 };
 
+/// The first target of that name, made where the file has none.
+KvfSection& TargetOf(KvfFile& file, std::string_view name) {
+  KvfSection* target = AsSection(FindKvfNode(file.top, false, name));
+  return target ? *target : *file.AddSection(file.top, KvfKind::Target, name);
+}
+
 }  // namespace
 
 std::string ComparedText(const KvfNode& keyword) {
@@ -194,6 +201,24 @@ std::vector<SetupDifference> CompareSetups(KvfSection& from, KvfSection& to, con
   Comparison comparison(reference);
   comparison.CompareSections(from, to, {});
   return std::move(comparison.result);
+}
+
+std::vector<SetupDifference> CompareFiles(KvfFile& before, KvfFile& after, std::string_view setup) {
+  std::vector<SetupDifference> differences;
+  for (const std::string_view target : {setup, std::string_view("SYSTEM")})
+    for (SetupDifference& difference :
+         CompareSetups(TargetOf(before, target), TargetOf(after, target), KeyReference::Get()))
+      differences.push_back(std::move(difference));
+  return differences;
+}
+
+std::vector<SetupDifference> CompareDocuments(const CFlowModelDoc& before, const CFlowModelDoc& after) {
+  const std::string& folder = after.Root().SetupFolder();
+  KvfFile *old = before.BuildFile(folder), *present = after.BuildFile(folder);
+  std::vector<SetupDifference> differences = CompareFiles(*old, *present, after.Root().GetTargetName());
+  kvfClose(&old);
+  kvfClose(&present);
+  return differences;
 }
 
 }  // namespace tervane

@@ -3,12 +3,15 @@
 #pragma once
 
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "core/kvf_tree.h"
 #include "document/key_reference.h"
 
 namespace tervane {
+
+class CFlowModelDoc;
 
 /// One difference between two setups.
 struct SetupDifference {
@@ -31,5 +34,9 @@ std::string ComparedText(const KvfNode& keyword);
 /// to their new places: first by equal content, then by equal `Name`, then by place. What every save computes anew
 /// (`IsDataUsedInSetup`, item counts) and whether a page was visited (`Touched`) is left out.
 std::vector<SetupDifference> CompareSetups(KvfSection& from, KvfSection& to, const KeyReference& reference);
+/// The differences in all that the files of two setups hold, whose target has that name.
+std::vector<SetupDifference> CompareFiles(KvfFile& before, KvfFile& after, std::string_view setup);
+/// The same of two documents, which may lie in different folders.
+std::vector<SetupDifference> CompareDocuments(const CFlowModelDoc& before, const CFlowModelDoc& after);
 
 }  // namespace tervane

@@ -5,10 +5,12 @@
 #include <chrono>
 #include <filesystem>
 #include <sstream>
+#include <thread>
 
 #include <fmt/format.h>
 
 #include "execution/engine_search.h"
+#include "execution/run_passport.h"
 #include "execution/run_state.h"
 #include "platform/files.h"
 #include "platform/os.h"
@@ -79,6 +81,29 @@ void WaitForEnd(os::ProgramTree& tree, HeldRunState& held, RunState& state) {
   }
 }
 
+/// Notes what the run reads while it goes on.
+class PassportNotes {
+ public:
+  explicit PassportNotes(const std::string& statePath, const RunState& state)
+      : path_(PassportFilesOf(FolderOf(statePath), state.setup).passport) {
+    std::string ignored;
+    passport_ = ReadPassport(path_, ignored);
+    if (passport_ && passport_->id != state.id) passport_.reset();
+    if (passport_) hashing_ = std::thread([this] { HashInputs(*passport_); });
+  }
+  /// Waits for what is still to be read.
+  void Finish(const RunState& state) {
+    if (!passport_) return;
+    hashing_.join();
+    FinishPassport(std::move(*passport_), state, path_);
+  }
+
+ private:
+  std::string path_;
+  std::optional<RunPassport> passport_;
+  std::thread hashing_;
+};
+
 /// Ends what the engine has left.
 void EndLeftProcesses(os::ProgramTree& tree, RunState& state) {
   if (WaitForAll(tree, kGraceOfLeft)) return;
@@ -97,7 +122,8 @@ std::string RunnerProgram() {
 int RunEngineAndWait(const std::vector<std::string>& arguments) {
   os::KeepEndRequests();
   if (arguments.size() != 2) return kRunnerMisused;
-  HeldRunState held;
+  std::optional<HeldRunState> hold(std::in_place);
+  HeldRunState& held = *hold;
   std::string ignored;
   if (held.Hold(arguments[0], kPatience, ignored) != HeldRunState::Outcome::Held) return kRunnerOvertaken;
   std::optional<RunState> begun = held.Read();
@@ -106,6 +132,7 @@ int RunEngineAndWait(const std::vector<std::string>& arguments) {
   state.runner = RunningProcess::This();
   if (!held.Write(state, ignored)) return kRunnerCannotWrite;
 
+  PassportNotes notes(arguments[0], state);
   const std::string log = LogBeside(arguments[0]);
   const FileStamp reportBefore = StampOf(state.report);
   os::ProgramTree tree;
@@ -131,7 +158,11 @@ int RunEngineAndWait(const std::vector<std::string>& arguments) {
   std::error_code error;
   const std::filesystem::space_info space = std::filesystem::space(NativePath(FolderOf(arguments[0])), error);
   state.isDiskFull = !error && space.available < kLeastSpace;
-  return held.Write(state, ignored) ? kRunnerDone : kRunnerCannotWrite;
+  const bool isWritten = held.Write(state, ignored);
+  // Inputs that take longer to read than the engine ran hold nobody up.
+  hold.reset();
+  notes.Finish(state);
+  return isWritten ? kRunnerDone : kRunnerCannotWrite;
 }
 
 }  // namespace tervane

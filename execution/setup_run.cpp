@@ -9,7 +9,9 @@
 
 #include "execution/engine_runner.h"
 #include "execution/engine_search.h"
+#include "execution/run_passport.h"
 #include "platform/dates.h"
+#include "platform/files.h"
 #include "platform/paths.h"
 
 namespace tervane {
@@ -75,6 +77,13 @@ bool SetupRun::Start(const RunRequest& request, std::string& problem) {
     state_.starter = RunningProcess::This();
     state_.begun = NowInMilliseconds();
     if (!held.Write(state_, problem)) return false;
+    if (!request.inputs.empty()) {
+      const PassportFiles passport = PassportFilesOf(request.resultFolder, setup);
+      // Results without a passport are better than no results; an old one would speak of others.
+      if (!WriteFileAtomically(passport.setup, request.setupText).Ok() ||
+          !WritePassport(PassportOf(state_, request.inputs), passport.passport).Ok())
+        std::filesystem::remove(NativePath(passport.passport), error);
+    }
   }
   outcome_ = RunOutcome::GoingOn;
   stopsWanted_ = stopsSent_ = 0;

@@ -23,6 +23,10 @@ struct RunRequest {
   std::string options;       ///< Separated by blanks; may be empty.
   std::string extraLog;      ///< May be empty.
   std::string report;        ///< What the run must leave; may be empty.
+  // For the passport; a run that makes no results has none.
+
+  std::vector<std::string> inputs = {};  ///< What it reads.
+  std::string setupText = {};            ///< The setup, with names of files from the folder of the results.
 };
 
 /// The request that a document's start comes to; nothing, with the problem, when the engine is not there.

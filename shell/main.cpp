@@ -20,6 +20,7 @@
 #include <CLI/CLI.hpp>
 
 #include "platform/os.h"
+#include "platform/version.h"
 #include "shell/document_frame.h"
 #include "shell/main_window.h"
 #include "shell/program.h"
@@ -183,12 +184,12 @@ int main(int argc, char** argv) {
   commandLine
       .add_option("--delay", typed.delay, "Draw it after so many milliseconds, whatever is still being computed")
       ->check(CLI::NonNegativeNumber);
-  commandLine.set_version_flag("--version", "quarzel 0.1.0");
+  commandLine.set_version_flag("--version", std::string("quarzel ") + kProgramVersion);
   CLI11_PARSE(commandLine, argc, argv);
 
   Application application(argc, argv);
   QApplication::setApplicationName("Quarzel");
-  QApplication::setApplicationVersion("0.1.0");
+  QApplication::setApplicationVersion(kProgramVersion);
   QTranslator translator;
   if (translator.load(QLocale(), "quarzel", "_", QApplication::applicationDirPath() + "/translations"))
     QApplication::installTranslator(&translator);

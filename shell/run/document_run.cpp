@@ -6,6 +6,7 @@
 #include <QFileInfo>
 #include <QGuiApplication>
 
+#include "document/run_inputs.h"
 #include "execution/engine_search.h"
 #include "platform/files.h"
 #include "shell/run/run_panel.h"
@@ -50,8 +51,9 @@ bool DocumentRun::IsShiftHeld() const { return QGuiApplication::keyboardModifier
 void DocumentRun::Start(const CYbSimpleLaunch& launch, bool showsProgress) {
   std::string problem;
   SetupRun run;
-  const std::optional<RunRequest> request = RequestOf(launch, session_.Document().getResultFolder(),
-                                                      EnginePlaces::Here(host_.Setting(kEnginePathSetting)), problem);
+  std::optional<RunRequest> request = RequestOf(launch, session_.Document().getResultFolder(),
+                                                EnginePlaces::Here(host_.Setting(kEnginePathSetting)), problem);
+  if (request) PreparePassport(session_.Document(), *request);
   if (!request || !run.Start(*request, problem)) {
     AddToLog(tr("Not run: %1").arg(ToQt(problem)));
     host_.ShowMessage(problem, Host::Icon::Error);

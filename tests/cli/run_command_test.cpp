@@ -1,11 +1,16 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <chrono>
+#include <filesystem>
+#include <optional>
 #include <sstream>
+#include <thread>
 
 #include <gmock/gmock.h>
 #include <rapidjson/document.h>
 
 #include "cli/command_line.h"
+#include "execution/run_passport.h"
 #include "tests/support/engine_script.h"
 #include "tests/support/setup.h"
 
@@ -61,6 +66,59 @@ TEST_F(RunCommand, TellsTheSameAsJson) {
   EXPECT_STREQ(json["findings"][0]["text"].GetString(), "\"bad\"");
   EXPECT_FALSE(json["findings"][1].HasMember("place"));
   EXPECT_THAT(err.str(), HasSubstr("warning: odd"));
+}
+
+TEST_F(RunCommand, ItsPassportTellsWhatHasChangedSince) {
+  const auto rain = [](const std::string& more) {
+    return test::SetupText(14,
+                           more +
+                               "section Climate {\nsection PrecipitationRate {\nsection GLOBAL {\nTYPE = 2\nsection "
+                               "TIME_SERIES_FILE {\nFILE_NAME = file \"rain.nds0\"\n}\n}\n}\n}");
+  };
+  const auto verify = [&] {
+    out.str({});
+    err.str({});
+    return RunCommandLine({"run", file, "--verify"}, out, err);
+  };
+  EXPECT_EQ(verify(), kCouldNot);
+  EXPECT_THAT(err.str(), HasSubstr("no results of a run that left a passport"));
+  folder.Write("karup.tvd", rain({}));
+  folder.Write("rain.nds0", "wet");
+  // What only preprocesses makes no results.
+  Tervane("true", {"--pp"});
+  EXPECT_EQ(verify(), kCouldNot);
+  ASSERT_EQ(Tervane("true", {"--wm"}), kDone) << err.str();
+  // The files are read beside the run, and to their end behind it.
+  const std::string path = PassportFilesOf(folder.File("karup_results"), file).passport;
+  std::string problem;
+  std::optional<RunPassport> passport;
+  for (int i = 0; i < 500 && !(passport && passport->HasAllHashes() && !passport->outcome.empty()); ++i) {
+    passport = ReadPassport(path, problem);
+    std::this_thread::sleep_for(std::chrono::milliseconds(10));
+  }
+  ASSERT_TRUE(passport && passport->HasAllHashes()) << problem;
+  ASSERT_EQ(passport->inputs.size(), 2U);
+  EXPECT_EQ(passport->inputs[0].path, file);
+  EXPECT_EQ(passport->inputs[1].size, "3");
+  EXPECT_THAT(passport->outcome, HasSubstr("The run is done"));
+  EXPECT_EQ(passport->options, "/WM");
+  EXPECT_EQ(verify(), kDone) << out.str();
+
+  const auto ofLater = [&](const char* content) {
+    folder.Write("rain.nds0", content);
+    const auto later = std::filesystem::last_write_time(folder.File("rain.nds0")) + std::chrono::hours(1);
+    std::filesystem::last_write_time(folder.File("rain.nds0"), later);
+    return verify();
+  };
+  EXPECT_EQ(ofLater("wet"), kDone) << out.str();
+  EXPECT_EQ(ofLater("dry"), kFindings);
+  EXPECT_EQ(out.str(), folder.File("rain.nds0") + ": has changed\n");
+  std::filesystem::remove(folder.File("rain.nds0"));
+  EXPECT_EQ(verify(), kFindings);
+  EXPECT_THAT(out.str(), HasSubstr("rain.nds0: is gone"));
+  folder.Write("karup.tvd", rain("section SimSpec {\nsection SimTitle {\nTitle = \"Dry\"\n}\n}\n"));
+  EXPECT_EQ(verify(), kFindings);
+  EXPECT_THAT(out.str(), HasSubstr("SimSpec/SimTitle:Title: \"\" (default) -> \"Dry\"\n"));
 }
 
 TEST_F(RunCommand, ARunThatDidNotBeginCouldNotBeDone) {
