@@ -148,7 +148,8 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
   connect(frame, &DocumentFrame::Told, this, [this](const QString& text) { statusBar()->showMessage(text, kToldFor); });
   connect(frame, &DocumentFrame::DataFileWanted, this, [this, frame](const QString& path) {
-    if (!ShowDataFile(path) || !Viewer()) return;
+    const bool isSetup = path.endsWith(".tvd", Qt::CaseInsensitive);
+    if (!(isSetup ? OpenDocument(path) : ShowDataFile(path)) || !Viewer()) return;
     Viewer()->PutOverMaps([setup = QPointer(frame)](MapContent& map) {
       if (setup) AddDomainOutline(setup->Session().Document().Root(), map);
     });

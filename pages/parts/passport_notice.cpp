@@ -1,0 +1,67 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "pages/parts/passport_notice.h"
+
+#include <fmt/format.h>
+
+#include "core/document.h"
+#include "execution/run_passport.h"
+#include "platform/paths.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr std::size_t kMostNames = 5;
+
+PassportFiles FilesOf(const CYbSEDlgBase& page) {
+  const CYbSEDocument& document = page.Context().document;
+  return PassportFilesOf(ResolvedPath(document.getResultFolder(), {}), document.PathName());
+}
+
+/// "the setup, rain.nds0 (is gone) and 3 more files"
+std::string ListOf(const std::vector<InputChange>& changes, const std::string& setup) {
+  std::string list;
+  for (std::size_t i = 0; i < std::min(changes.size(), kMostNames); ++i) {
+    const InputChange& change = changes[i];
+    if (i > 0) list += i + 1 == changes.size() ? " and " : ", ";
+    list += change.path == setup ? "the setup" : std::string(FileNameOf(change.path));
+    if (change.fate != InputFate::Changed) list += fmt::format(" ({})", NameOf(change.fate));
+  }
+  if (changes.size() > kMostNames) list += fmt::format(" and {} more files", changes.size() - kMostNames);
+  return list;
+}
+
+/// Empty where nothing is known of the run.
+std::string NoticeOf(const CYbSEDlgBase& page) {
+  if (page.Context().document.PathName().empty()) return {};
+  std::string problem;
+  const std::optional<RunPassport> passport = ReadPassport(FilesOf(page).passport, problem);
+  if (!passport) return problem;
+  std::string text = fmt::format("Of the run that {} began on {}, {} UTC. {}", passport->user, passport->host,
+                                 passport->begun, passport->outcome);
+  // The page waits for no file to be read; the command line holds contents against each other.
+  const std::vector<InputChange> changes = ChangedInputs(*passport, true);
+  if (!changes.empty()) text += fmt::format("\nWritten anew since then: {}.", ListOf(changes, passport->setup));
+  return text;
+}
+
+}  // namespace
+
+void DescribePassport(PageForm& form, const CYbSEDlgBase& page) {
+  form.Notice([&page] { return NoticeOf(page); });
+  form.Button("Open the Setup That Made This",
+              [&page] {
+                const std::string setup = FilesOf(page).setup;
+                if (!FileExists(setup))
+                  page.Context().host.ShowMessage("The run left no copy of its setup.", Host::Icon::Information);
+                else if (page.Context().openDataFile)
+                  page.Context().openDataFile(setup);
+              })
+      .ToolTip("Opens a copy of the setup as it was when the run began")
+      .ShownWhen(Condition::Sentence("A run has left its passport", [&page](const CYbSEKvfBase&) {
+        return !page.Context().document.PathName().empty() && FileExists(FilesOf(page).passport);
+      }));
+}
+
+}  // namespace tervane
