@@ -272,12 +272,15 @@ class CTvnMasterList : public CYbSEKvfListBase<Item>, public ListBase {
   /// Items whose section is missing are named and linked like added ones.
   void Load(KvfNode* parentSection) override {
     Nodes::Load(parentSection);
+    int lastRead = this->GetItemCount();
+    while (lastRead > 0 && this->MissedSection(*this->GetItem(lastRead))) --lastRead;
     for (int number = 1; number <= this->GetItemCount(); ++number) {
       Item* item = this->GetItem(number);
       if (!this->MissedSection(*item)) continue;
       if (item->GetName().empty()) item->SetName(NewName(*item));
       LinkNewItem(item);
-      BringDependentsTo(*item, number);
+      // Behind all others its entries stand at their end anyway.
+      if (number < lastRead) BringDependentsTo(*item, number);
     }
   }
 

@@ -206,7 +206,7 @@ bool KeyExchange::Read(std::string_view key, FileName& value) {
     kvfAddNote(section_, key, "a folder stands where a file was expected: it reads as empty");
     value = FileName();
   } else {
-    value = FileName(std::string(text), kvfFolderOf(section_));
+    value = text.empty() ? FileName() : FileName(std::string(text), kvfFolderOf(section_));
   }
   return true;
 }

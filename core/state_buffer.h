@@ -19,8 +19,10 @@ template <class State>
 class PutsParts {
  public:
   void Put(const FileName& value) {
+    static const std::string kNone;
     Self().Put(value.Text());
-    Self().Put(value.Folder());
+    // Most names are empty, and then mean the same in every folder.
+    Self().Put(value.IsEmpty() ? kNone : value.Folder());
   }
   void Put(const CYbDateTime& value) {
     for (const int field : {value.Year(), value.Month(), value.Day(), value.Hour(), value.Minute(), value.Second()})

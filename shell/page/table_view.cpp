@@ -171,8 +171,8 @@ void TableView::ConnectView() {
       areColumnsTheUsers_ = true;
   });
   connect(view_->selectionModel(), &QItemSelectionModel::selectionChanged, this, [this] {
-    const auto cells = Selected();
-    control_.table->Select(cells ? cells->firstRow : 0, cells ? cells->lastRow : 0);
+    const auto selected = Selected();
+    control_.table->Select(selected ? selected->firstRow : 0, selected ? selected->lastRow : 0);
     SyncButtons();
   });
   connect(view_->selectionModel(), &QItemSelectionModel::currentChanged, this,
