@@ -120,9 +120,9 @@ std::uint64_t Product(std::uint64_t a, std::uint64_t b) {
 std::uint64_t Padded(std::uint64_t size) { return (size + 3) / 4 * 4; }
 
 /// Walks a classic header from the file's start.
-class HeaderReader {
+class ClassicHeaderReader {
  public:
-  explicit HeaderReader(const std::string& path) { file_ = os::File::OpenForReading(path, error_); }
+  explicit ClassicHeaderReader(const std::string& path) { file_ = os::File::OpenForReading(path, error_); }
 
   /// The size of the file by the system; 0 when it cannot be told.
   std::uint64_t FileSize() { return file_.IsOpen() ? file_.GetStatus(error_).size : 0; }
@@ -160,7 +160,7 @@ class HeaderReader {
 };
 
 struct ClassicHeader {
-  HeaderReader& in;
+  ClassicHeaderReader& in;
   int sizeBytes;    ///< Of a count.
   int offsetBytes;  ///< Of a place in the file.
   std::uint64_t fileSize;
@@ -197,7 +197,7 @@ struct ClassicHeader {
 
 /// The bytes that the file must have at least; the last one's padding need not be there.
 std::uint64_t NeededSize(ClassicHeader& header) {
-  HeaderReader& in = header.in;
+  ClassicHeaderReader& in = header.in;
   const std::uint64_t records = in.Number(header.sizeBytes);
   // The number that stands for "as many as there are", of a file that is being written.
   const bool isStreaming = records == (header.sizeBytes == 8 ? ~std::uint64_t{0} : 0xFFFFFFFFu);
@@ -255,7 +255,7 @@ std::uint64_t NeededSize(ClassicHeader& header) {
 
 std::string WhyClassicFileIsBad(const std::string& path, bool& isClassic) {
   isClassic = false;
-  HeaderReader in(path);
+  ClassicHeaderReader in(path);
   const std::uint64_t size = in.FileSize();
   if (size < 4) return "it is too short for a netCDF file";
   const std::uint64_t magic = in.Number(3);

@@ -8,7 +8,7 @@
 
 #include <fmt/format.h>
 
-#include "core/kvf.h"
+#include "core/open_kvf.h"
 #include "platform/os.h"
 #include "platform/paths.h"
 #include "platform/text.h"
@@ -22,11 +22,6 @@ namespace fs = std::filesystem;
 
 /// Data, items added and deleted, the tree, the order: what undo may have changed.
 constexpr int kAllHints = 1 | 2 | 4 | 8 | 16;
-
-struct CloseKvf {
-  void operator()(KvfFile* file) const { kvfClose(&file); }
-};
-using OpenKvf = std::unique_ptr<KvfFile, CloseKvf>;
 
 std::string HashText(std::string_view content) { return fmt::format("{:016x}", HashOf(content)); }
 

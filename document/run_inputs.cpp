@@ -5,9 +5,9 @@
 #include <algorithm>
 #include <array>
 #include <filesystem>
-#include <memory>
 #include <unordered_set>
 
+#include "core/open_kvf.h"
 #include "execution/execute_flags.h"
 #include "execution/run_passport.h"
 #include "platform/paths.h"
@@ -65,9 +65,8 @@ class InputCollector {
     if (steps_ >= kMostSteps) return;
     ++steps_;
     kvfGetErrorGlb();  // what an earlier reader left
-    KvfFile* file = kvfLoadFile(path, 0);
+    const OpenKvf file(kvfLoadFile(path, 0));
     if (kvfGetErrorGlb() == kKvfNoError) AddNamesIn(file->top, std::string(FolderOf(path)));
-    kvfClose(&file);
     --steps_;
   }
 
@@ -84,12 +83,11 @@ std::vector<std::string> InputsOf(const CFlowModelDoc& document) {
   InputCollector inputs(ResolvedPath(document.getResultFolder(), {}) + "/");
   inputs.Add(AbsoluteFromHere(document.PathName()));
   const std::string& folder = document.Root().SetupFolder();
-  KvfFile* file = document.BuildFile(folder);
+  const OpenKvf file(document.BuildFile(folder));
   const KvfSection& setup = *AsSection(FindKvfNode(file->top, false, document.Root().GetTargetName()));
   for (const KvfNode* node = setup.firstChild; node; node = node->next)
     if (!node->IsKeyword() && std::ranges::find(kOnlyShown, node->Name()) == kOnlyShown.end())
       inputs.AddNamesIn(*AsSection(node), folder);
-  kvfClose(&file);
   return inputs.Take();
 }
 

@@ -8,6 +8,7 @@
 
 #include "core/kvf_writer.h"
 #include "core/list.h"
+#include "core/open_kvf.h"
 #include "core/path.h"
 #include "document/flow_model_document.h"
 
@@ -214,11 +215,8 @@ std::vector<SetupDifference> CompareFiles(KvfFile& before, KvfFile& after, std::
 
 std::vector<SetupDifference> CompareDocuments(const CFlowModelDoc& before, const CFlowModelDoc& after) {
   const std::string& folder = after.Root().SetupFolder();
-  KvfFile *old = before.BuildFile(folder), *present = after.BuildFile(folder);
-  std::vector<SetupDifference> differences = CompareFiles(*old, *present, after.Root().GetTargetName());
-  kvfClose(&old);
-  kvfClose(&present);
-  return differences;
+  return CompareFiles(*OpenKvf(before.BuildFile(folder)), *OpenKvf(after.BuildFile(folder)),
+                      after.Root().GetTargetName());
 }
 
 }  // namespace tervane

@@ -9,16 +9,13 @@
 #include "core/kvf.h"
 #include "core/kvf_writer.h"
 #include "core/list.h"
+#include "core/open_kvf.h"
 #include "core/path.h"
 #include "spatial/zone_sync.h"
 
 namespace tervane {
 
 namespace {
-
-struct CloseKvf {
-  void operator()(KvfFile* file) const { kvfClose(&file); }
-};
 
 /// A setup as it would be written to a folder.
 class Written {
@@ -43,7 +40,7 @@ class Written {
   }
 
  private:
-  std::unique_ptr<KvfFile, CloseKvf> file_;
+  OpenKvf file_;
   KvfSection* target_;
 };
 

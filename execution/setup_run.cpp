@@ -19,7 +19,7 @@ namespace tervane {
 namespace {
 
 /// How long the runner of a run that has ended may take to let go of the state.
-constexpr std::chrono::milliseconds kPatience{500};
+constexpr std::chrono::milliseconds kPatienceWithRunner{500};
 
 std::string NewId() {
   static std::atomic<unsigned> counter{0};
@@ -61,7 +61,7 @@ bool SetupRun::Start(const RunRequest& request, std::string& problem) {
   state_ = {};
   {
     HeldRunState held;
-    const HeldRunState::Outcome outcome = held.Hold(files_.state, kPatience, problem);
+    const HeldRunState::Outcome outcome = held.Hold(files_.state, kPatienceWithRunner, problem);
     if (outcome == HeldRunState::Outcome::CannotWrite) return false;
     const std::optional<RunState> earlier = held.Read();
     if (outcome == HeldRunState::Outcome::HeldByOther || (earlier && MayStillRun(*earlier))) {
@@ -162,7 +162,7 @@ void SetupRun::MarkReported() {
   state_.isReported = true;
   HeldRunState held;
   std::string ignored;
-  if (held.Hold(files_.state, kPatience, ignored) != HeldRunState::Outcome::Held) return;
+  if (held.Hold(files_.state, kPatienceWithRunner, ignored) != HeldRunState::Outcome::Held) return;
   const std::optional<RunState> now = held.Read();
   if (now && now->id == state_.id) held.Write(state_, ignored);
 }

@@ -28,8 +28,6 @@ SortKey KeyOf(const CellValue& value, std::string shown) {
   return key;
 }
 
-bool IsDigit(char c) { return c >= '0' && c <= '9'; }
-
 /// Numbers within texts go by their value: "Gauge 9" stands before "Gauge 10".
 bool IsBefore(std::string_view a, std::string_view b) {
   while (!a.empty() && !b.empty()) {

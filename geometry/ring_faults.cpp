@@ -17,7 +17,7 @@ namespace {
 /// Pairs of edges that are looked at, over all rings; some 0.1 s.
 constexpr std::size_t kMostPairs = 20'000'000;
 
-struct Edge {
+struct RingEdge {
   MapPoint from, to;
 
   double Left() const { return std::min(from.x, to.x); }
@@ -30,7 +30,7 @@ double Side(MapPoint a, MapPoint b, MapPoint point) {
 }
 
 /// Where the insides of two edges cross; touching ends are no crossing.
-std::optional<MapPoint> Crossing(const Edge& a, const Edge& b) {
+std::optional<MapPoint> Crossing(const RingEdge& a, const RingEdge& b) {
   const double b1 = Side(a.from, a.to, b.from), b2 = Side(a.from, a.to, b.to);
   const double a1 = Side(b.from, b.to, a.from), a2 = Side(b.from, b.to, a.to);
   if (!(b1 * b2 < 0 && a1 * a2 < 0)) return std::nullopt;
@@ -41,16 +41,16 @@ std::optional<MapPoint> Crossing(const Edge& a, const Edge& b) {
 /// Goes through the edges from west to east, each against those that reach as far.
 std::optional<MapPoint> FirstCrossing(std::span<const MapPoint> ring, std::size_t& pairs) {
   if (pairs > kMostPairs) return std::nullopt;
-  std::vector<Edge> edges;
+  std::vector<RingEdge> edges;
   for (std::size_t i = 0; i + 1 < ring.size(); ++i)
     if (!(ring[i] == ring[i + 1])) edges.push_back({ring[i], ring[i + 1]});
-  std::ranges::sort(edges, {}, &Edge::Left);
-  std::vector<const Edge*> reaching;
-  for (const Edge& edge : edges) {
-    std::erase_if(reaching, [&](const Edge* other) { return other->Right() < edge.Left(); });
+  std::ranges::sort(edges, {}, &RingEdge::Left);
+  std::vector<const RingEdge*> reaching;
+  for (const RingEdge& edge : edges) {
+    std::erase_if(reaching, [&](const RingEdge* other) { return other->Right() < edge.Left(); });
     pairs += reaching.size();
     if (pairs > kMostPairs) return std::nullopt;
-    for (const Edge* other : reaching)
+    for (const RingEdge* other : reaching)
       if (const auto crossing = Crossing(edge, *other)) return crossing;
     reaching.push_back(&edge);
   }

@@ -6,6 +6,8 @@
 
 #include <fmt/format.h>
 
+#include "platform/text.h"
+
 namespace tervane {
 namespace {
 
@@ -57,8 +59,6 @@ int FieldOf(char letter) {
 }
 
 bool IsBlank(char c) { return c == ' ' || c == '\t'; }
-bool IsDigit(char c) { return c >= '0' && c <= '9'; }
-
 void SkipBlanks(std::string_view& text) {
   while (!text.empty() && IsBlank(text.front())) text.remove_prefix(1);
 }

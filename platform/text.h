@@ -12,6 +12,9 @@
 
 namespace tervane {
 
+/// One of the ten, whatever the locale.
+inline bool IsDigit(char c) { return c >= '0' && c <= '9'; }
+
 /// The text without blanks, tabs and line ends at both sides.
 std::string_view Trimmed(std::string_view text);
 

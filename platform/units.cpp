@@ -25,7 +25,6 @@
 namespace tervane {
 namespace {
 
-bool IsDigit(char c) { return c >= '0' && c <= '9'; }
 bool IsLetter(char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); }
 
 /// What people and files write outside ASCII in units and numbers, as UDUNITS and we compare it.

@@ -34,7 +34,7 @@ CYbDateTime ToTheMinute(const CYbDateTime& date) {
   return {date.Year(), date.Month(), date.Day(), date.Hour(), date.Minute()};
 }
 
-std::string TextOf(const CYbDateTime& date) { return date.Format(CStressPeriodsKvf::kDateFormat); }
+std::string EndText(const CYbDateTime& date) { return date.Format(CStressPeriodsKvf::kDateFormat); }
 
 }  // namespace
 
@@ -113,9 +113,9 @@ std::vector<CYbDateTime> CStressPeriodsKvf::GetDateMarkers() const {
 }
 
 std::string CStressPeriodsKvf::GetDateText(int number) const {
-  if (number == 0) return TextOf(SimulationOf(*this).start);
+  if (number == 0) return EndText(SimulationOf(*this).start);
   const CStressPeriodsItemKvf* item = GetItem(number);
-  return item ? TextOf(item->EndDate()) : "ERROR";
+  return item ? EndText(item->EndDate()) : "ERROR";
 }
 
 CYbDateTimeSpan CStressPeriodsKvf::LengthOf(int number) const {
@@ -182,16 +182,16 @@ int CStressPeriodsKvf::ValidateData() {
   CYbDateTime before = start;
   for (int number = 1; number <= GetItemCount() && error.empty(); ++number) {
     const CYbDateTime& date = GetItem(number)->EndDate();
-    const std::string period = fmt::format("period {} ends at {}", number, TextOf(date));
+    const std::string period = fmt::format("period {} ends at {}", number, EndText(date));
     if (date <= before && number == 1) {
       error = "The End Date of the first Stress Period date must be after Simulation Start Date.";
-      detail = fmt::format("{}, the simulation starts at {}", period, TextOf(start));
+      detail = fmt::format("{}, the simulation starts at {}", period, EndText(start));
     } else if (date <= before) {
       error = "All Stress Period Dates must be increasing.";
-      detail = fmt::format("{}, the one before it at {}", period, TextOf(before));
+      detail = fmt::format("{}, the one before it at {}", period, EndText(before));
     } else if (number > 1 && date > end) {
       error = "All Dates must be before Simulation End Date.";
-      detail = fmt::format("{}, the simulation at {}", period, TextOf(end));
+      detail = fmt::format("{}, the simulation at {}", period, EndText(end));
     }
     before = date;
   }
@@ -201,7 +201,7 @@ int CStressPeriodsKvf::ValidateData() {
   if (error.empty()) return 1;
   // The next validation finds the moved end in order.
   if (last->EndDate() != lastBefore)
-    detail += fmt::format("; the end of the last period was moved to {}", TextOf(last->EndDate()));
+    detail += fmt::format("; the end of the last period was moved to {}", EndText(last->EndDate()));
   AddError(std::move(error), {}, std::move(detail));
   return 0;
 }

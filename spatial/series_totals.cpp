@@ -14,7 +14,7 @@ namespace tervane {
 
 namespace {
 
-constexpr double kNone = std::numeric_limits<double>::quiet_NaN();
+constexpr double kNoTotal = std::numeric_limits<double>::quiet_NaN();
 constexpr std::size_t kStepsAtOnce = 1 << 18;
 
 bool IsOverSteps(ValueType type) { return type == ValueType::StepAccumulated || type == ValueType::MeanStep; }
@@ -90,7 +90,7 @@ SeriesFacts SumSteps(const DataItem& item, const TimeAxis& time, const std::vect
   const std::int64_t usual = UsualStep(time);
   const bool isOverSteps = IsOverSteps(item.valueType), isSummed = item.valueType == ValueType::Accumulated;
   std::optional<std::size_t> readStep;
-  double before = kNone, value = kNone;
+  double before = kNoTotal, value = kNoTotal;
   for (std::size_t step = 0; step < time.stamps.size(); ++step) {
     if (progress.IsCancelled()) {
       facts.error = kCancelled;
@@ -100,7 +100,7 @@ SeriesFacts SumSteps(const DataItem& item, const TimeAxis& time, const std::vect
     const bool isFirst = step == 0;
     const TimeSpan span{isFirst ? BeginOfFirstStep(time) : time.stamps[step - 1], time.stamps[step]};
     if (!isWanted(span)) continue;
-    before = isFirst && isSummed ? 0 : kNone;
+    before = isFirst && isSummed ? 0 : kNoTotal;
     if (!isFirst && !isOverSteps) {
       before = value;
       // The one in front was passed over.
@@ -158,7 +158,7 @@ SeriesFacts SumSeries(const std::string& path, int number, const std::vector<Tim
           if (std::string error = file.Read(selection, values, item.itemType); !error.empty()) return error;
         }
         const float read = values[step - firstRead];
-        value = read == kDeleteValue ? kNone : static_cast<double>(read);
+        value = read == kDeleteValue ? kNoTotal : static_cast<double>(read);
         return {};
       },
       progress);
@@ -208,7 +208,7 @@ TotalForm TotalFormOf(int itemType, ValueType valueType) {
 }
 
 double TotalForm::Of(const PeriodSum& sum) const {
-  if (sum.covered <= 0) return kNone;
+  if (sum.covered <= 0) return kNoTotal;
   return (isTotal ? sum.integral : sum.integral / static_cast<double>(sum.covered)) * factor;
 }
 

@@ -12,6 +12,7 @@
 #include "data/datafile_facts.h"
 #include "pages/parts/file_controls.h"
 #include "platform/item_types.h"
+#include "platform/text.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"
 
@@ -27,8 +28,6 @@ std::vector<CodedZoneProp*> ZonesOfSource(const ZoneSource& source) {
     if (auto* zone = dynamic_cast<CodedZoneProp*>(item)) zones.push_back(zone);
   return zones;
 }
-
-bool IsDigit(char c) { return c >= '0' && c <= '9'; }
 
 /// The series of a file to choose from.
 CellChoices ItemsOf(const DataFileNode& file) {
