@@ -10,6 +10,7 @@
 
 #include "document/flow_model_document.h"
 #include "forms/plots.h"
+#include "pages/parts/passport_notice.h"
 #include "platform/files.h"
 #include "platform/paths.h"
 #include "results/result_nodes.h"
@@ -211,6 +212,7 @@ std::shared_ptr<TableOf<PointStatistics>> CRunStatisticsDlg::PointTable() {
 }
 
 void CRunStatisticsDlg::Describe(PageForm& form) {
+  DescribePassport(form, *this);
   if (const auto* simulation = Node().Important(kSimulationPeriod))
     period_ = {simulation->GetSimStartDate(), simulation->SIMEND};
   form.Date("Start date:", period_.start).Hint(kViewOnly);

@@ -8,6 +8,7 @@
 #include <fmt/format.h>
 
 #include "document/flow_model_document.h"
+#include "pages/parts/passport_notice.h"
 #include "platform/paths.h"
 #include "results/result_nodes.h"
 #include "results/viewer_setup.h"
@@ -64,6 +65,7 @@ std::shared_ptr<TableOf<CResultViewerDlg::Row>> CResultViewerDlg::CResultViewerG
 }
 
 void CResultViewerDlg::Describe(PageForm& form) {
+  DescribePassport(form, *this);
   form.Integer("Layer number:", Node().LayerNo)
       .ToolTip("The layer of results with layers that the viewer shows first, counted from the top");
   form.Notice([this] { return notice_; });

@@ -4,6 +4,7 @@
 
 #include <gmock/gmock.h>
 
+#include "execution/run_passport.h"
 #include "results/result_nodes.h"
 #include "tests/support/page_driver.h"
 #include "tests/support/setup.h"
@@ -108,6 +109,31 @@ TEST_F(ViewerPage, WhatCannotBeWrittenIsTold) {
   Table().Press(2, 3);
   EXPECT_TRUE(host.IsDone());
   EXPECT_THAT(opened, IsEmpty());
+}
+
+TEST_F(ViewerPage, TellsTheRunAndWhatWasWrittenSince) {
+  folder.Write("karup_results/karup.tvdres", CatalogueOf("1001", kFlow));
+  folder.Write("rain.nds0", "wet");
+  Open();
+  const auto text = [this] { return FormText(page->Form()); };
+  EXPECT_THAT(text(), HasSubstr("button \"Open the Setup That Made This\" hidden"));
+  RunState run;
+  run.setup = folder.File("karup.tvd");
+  run.starter.user = "jane";
+  run.begun = 1000;
+  const PassportFiles files = PassportFilesOf(folder.File("karup_results"), run.setup);
+  RunPassport passport = PassportOf(run, {run.setup, folder.File("rain.nds0")});
+  passport.outcome = "The run is done.";
+  ASSERT_EQ(WritePassport(passport, files.passport).error, "");
+  EXPECT_THAT(text(), HasSubstr("Of the run that jane began on , 1970-01-01 00:00:01 UTC. The run is done.\n"));
+  folder.Write("rain.nds0", "very wet");
+  folder.Write("karup.tvd", test::SetupText(14, "# another\n"));
+  EXPECT_THAT(text(), HasSubstr("Written anew since then: the setup and rain.nds0."));
+  folder.Write("karup_results/karup_Passport.tvd", test::SetupText(14, ""));
+  page->Form().ForEach([&](Control& control) {
+    if (control.label == "Open the Setup That Made This") page->Press(control);
+  });
+  EXPECT_THAT(opened, ElementsAre(files.setup));
 }
 
 }  // namespace
