@@ -15,6 +15,7 @@
 #include "pages/parts/create_dialogs.h"
 #include "pages/parts/domain_map.h"
 #include "pages/parts/file_controls.h"
+#include "pages/parts/passport_notice.h"
 #include "pages/parts/river_map.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
@@ -349,10 +350,12 @@ std::string ResultPageOf(const CYbSEDlgBase& page, std::string (CFlowModelDoc::*
 }
 
 void DescribeDetailedResults(PageForm& form, DetailedResultKvf& /*node*/, CYbSEDlgBase& page) {
+  DescribePassport(form, page);
   form.Report([&page] { return ResultPageOf(page, &CFlowModelDoc::DetailedTimeSeriesPage); });
 }
 
 void DescribeDetailedRiverResults(PageForm& form, DetailedResultKvf& /*node*/, CYbSEDlgBase& page) {
+  DescribePassport(form, page);
   form.Report([&page] { return ResultPageOf(page, &CFlowModelDoc::DetailedRiverTimeSeriesPage); });
 }
 
