@@ -11,6 +11,7 @@
 #include "data/datafile.h"
 #include "data/datafile_request.h"
 #include "data/grid_files.h"
+#include "engine/detailed_output.h"
 #include "engine/modflow_report.h"
 #include "engine/result_catalogue.h"
 #include "geometry/grid_polygons.h"
@@ -216,6 +217,9 @@ bool Preprocessor::FillPage(CYbSEKvfBase& node, ReportPage& page) {
     page.ShowText(SpansText(*spans));
   } else if (const auto* wells = dynamic_cast<const CSZWellKvf*>(&node)) {
     ShowWells(*wells, page);
+  } else if (const auto* points = dynamic_cast<const CDetailedTSOutputListKvf*>(&node);
+             points && points->GetItemCount() > 0) {
+    ShowDetailedPoints(*points, page);
   } else if (auto* quantity = dynamic_cast<CData2DKvf*>(&node)) {
     ShowQuantity(*quantity, page);
   } else if (auto* extent = dynamic_cast<ExtentKvf*>(&node)) {
@@ -329,6 +333,14 @@ void Preprocessor::ShowBoundaries(const CSZVerDiscrLayerKvf& layer, ReportPage& 
 void Preprocessor::ShowWells(const CSZWellKvf& wells, ReportPage& page) {
   const std::string path = wells.Filename.IsEmpty() ? std::string() : wells.Filename.Absolute();
   page.ShowText(WellsOnModel(path, *domain_, layers_, PathOf(wells), log_));
+}
+
+void Preprocessor::ShowDetailedPoints(const CDetailedTSOutputListKvf& points, ReportPage& page) {
+  // Beside the page on which a simulation shows them.
+  const std::string shown = ResolvedPath(document_.DetailedTimeSeriesPage(), {});
+  const std::string series = shown.substr(0, shown.size() - ExtensionOf(shown).size()) + ".nds0";
+  report_.detailedPoints = PlaceDetailedPoints(points, *domain_, layers_, series, log_);
+  page.ShowText(DetailedPointsText(report_.detailedPoints));
 }
 
 void Preprocessor::ShowQuantity(CData2DKvf& quantity, ReportPage& page) {

@@ -27,6 +27,7 @@ class CSatZoneKvf;
 class CUnSatInitConditionLayerListKvf;
 class CVegetationKvf;
 class CellValues;
+class CDetailedTSOutputListKvf;
 class CodedZonesKvf;
 class DataFileNode;
 class ExtentKvf;
@@ -70,6 +71,7 @@ class Preprocessor {
   /// What holds in the cells of a computational layer.
   void ShowBoundaries(const CSZVerDiscrLayerKvf& layer, ReportPage& page);
   void ShowWells(const CSZWellKvf& wells, ReportPage& page);
+  void ShowDetailedPoints(const CDetailedTSOutputListKvf& points, ReportPage& page);
   void ShowVegetation(CVegetationKvf& vegetation, ReportPage& page);
   /// The constants, both series on pages of their own, or which crop grows when.
   void ShowCourse(const VegetationCourse& course, ReportPage& page);

@@ -9,11 +9,15 @@
 #include "core/kvf.h"
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
+#include "data/series_file.h"
 #include "execution/execute_flags.h"
 #include "modelcells/model_layers.h"
 #include "platform/item_types.h"
 #include "platform/units.h"
+#include "results/detailed_points.h"
+#include "results/detailed_series.h"
 #include "results/result_catalogue_file.h"
+#include "results/storing.h"
 #include "simspec/model_components.h"
 #include "simspec/periods.h"
 #include "spatial/data2d.h"
@@ -84,6 +88,40 @@ class EngineProgram : public testing::Test {
   CFlowModelDoc document;
   std::string log;
 };
+
+TEST_F(EngineProgram, PlacesThePointsOfDetailedSeries) {
+  auto& points = *document.Root().Important(kStoringResults)->Child<CDetailedTSOutputListKvf>();
+  points.SetItemCount(2, 1);
+  constexpr int kWaterOnGround = 61;
+  const auto place = [&](int number, const char* name, double x, double y) {
+    CDetailedTSOutputItemKvf& point = *points.GetItem(number);
+    point.Name = name;
+    point.HydrComp = kWaterOnGround;
+    point.X = x;
+    point.Y = y;
+  };
+  place(1, "Gauge", 1150, 2050);
+  place(2, "Outside", 1050, 2350);
+  ASSERT_TRUE(WriteSeriesFile(folder.File("gauge.nds0"), {.name = "gauge",
+                                                          .itemType = quantity::kWaterLevel,
+                                                          .valueType = static_cast<int>(ValueType::Instantaneous),
+                                                          .times = {{2000, 1, 1}, {2000, 12, 1}},
+                                                          .values = {1, 2}})
+                  .Ok());
+  points.GetItem(1)->InclObserved = 1;
+  points.GetItem(1)->Observed().Choose(FileName("gauge.nds0", folder.Path()));
+  ASSERT_EQ(Run("/PP"), kEngineDone) << log;
+  EXPECT_THAT(log, HasSubstr("DetailedTimeseriesOutput/Item_2: the point lies outside the model domain"));
+  std::vector<DetailedPoint> placed;
+  ASSERT_EQ(ReadDetailedPoints(ReportPath(), placed).error, "");
+  ASSERT_EQ(placed.size(), 2U);
+  EXPECT_EQ(placed[0].name, "Gauge");
+  EXPECT_EQ(placed[0].dataType, "depth of overland water");
+  EXPECT_EQ(std::pair(placed[0].column, placed[0].row), std::pair(2, 1));
+  EXPECT_EQ(placed[0].layer, 0);
+  EXPECT_EQ(placed[0].observed, (SeriesPlace{folder.File("gauge.nds0"), 1}));
+  EXPECT_FALSE(placed[1].includesObserved);
+}
 
 TEST_F(EngineProgram, PutsQuantitiesOnTheCellsOfTheDomain) {
   // Half the cell size, so that a model cell's centre is a corner of four; the plane rises by 1 a metre to the east.
