@@ -25,7 +25,7 @@ namespace tervane {
 namespace {
 
 /// Values that are read and converted at one time, so few that they are still in the processor's cache in between.
-constexpr std::size_t kPiece = std::size_t{1} << 16;
+constexpr std::size_t kReadPiece = std::size_t{1} << 16;
 
 /// Whether a file is netCDF, by its first bytes, or too short for anything else; `reason` says what is wrong with one
 /// that is not whole, as far as its header shows.
@@ -138,7 +138,7 @@ void ValueSummary::AddRange(std::span<const float> values) {
   std::uint64_t added = 0;
   // In pieces that a small counter can hold.
   for (std::span<const float> rest = values; !rest.empty();) {
-    const std::span<const float> piece = rest.first(std::min(rest.size(), kPiece));
+    const std::span<const float> piece = rest.first(std::min(rest.size(), kReadPiece));
     rest = rest.subspan(piece.size());
     std::int32_t counted = 0;
     for (const float value : piece) {
@@ -231,7 +231,7 @@ constexpr const char* kTooLarge = "a value is too large for single precision in 
 /// cancelled read ends soon.
 class PieceReader {
  public:
-  /// `convert` gets each piece of values, at most kPiece, soon after it was read.
+  /// `convert` gets each piece of values, at most kReadPiece, soon after it was read.
   PieceReader(int file, const ItemStorage& storage, std::size_t size, ProgressPart progress,
               std::function<void(std::span<float>)> convert)
       : file_(file),
@@ -245,12 +245,12 @@ class PieceReader {
   };
   /// Dimensions before `d` have a count of 1 each. Gives the status of the library; throws `Cancelled`.
   int Read(std::size_t d, Box box, std::span<float> values) {
-    if (values.size() <= kPiece || d == box.count.size()) return Get(box, values);
+    if (values.size() <= kReadPiece || d == box.count.size()) return Get(box, values);
     const std::size_t all = box.count[d], inner = values.size() / all;
-    std::size_t atOnce = std::max<std::size_t>(kPiece / inner, 1);
+    std::size_t atOnce = std::max<std::size_t>(kReadPiece / inner, 1);
     // A stored piece is unpacked as a whole, so that it should be asked for once.
-    if (!storage_.chunk.empty() && inner <= kPiece) atOnce = std::max(atOnce / Chunk(d) * Chunk(d), Chunk(d));
-    if (!storage_.chunk.empty() && inner > kPiece) atOnce = d + 2 == box.count.size() ? Chunk(d) : 1;
+    if (!storage_.chunk.empty() && inner <= kReadPiece) atOnce = std::max(atOnce / Chunk(d) * Chunk(d), Chunk(d));
+    if (!storage_.chunk.empty() && inner > kReadPiece) atOnce = d + 2 == box.count.size() ? Chunk(d) : 1;
     for (std::size_t done = 0; done < all; done += atOnce) {
       box.count[d] = std::min(atOnce, all - done);
       const std::span<float> piece = values.subspan(done * inner, box.count[d] * inner);
@@ -267,7 +267,7 @@ class PieceReader {
   int Get(const Box& box, std::span<float> values) {
     const std::size_t columns = box.count.empty() ? 1 : box.count.back();
     const std::size_t width = storage_.chunk.empty() ? columns : Chunk(box.count.size() - 1);
-    if (values.size() <= kPiece || width >= columns) return GetAtOnce(box, values);
+    if (values.size() <= kReadPiece || width >= columns) return GetAtOnce(box, values);
     // Wide rows of packed pieces, one piece after the other.
     Box part = box;
     std::vector<float> read;
@@ -287,8 +287,8 @@ class PieceReader {
     progress_.ThrowIfCancelled();
     const int status = GetLocked(box, values);
     progress_.Report(static_cast<double>(done_ += values.size()) / size_);
-    for (; status == NC_NOERR && !values.empty(); values = values.subspan(std::min(kPiece, values.size())))
-      convert_(values.first(std::min(kPiece, values.size())));
+    for (; status == NC_NOERR && !values.empty(); values = values.subspan(std::min(kReadPiece, values.size())))
+      convert_(values.first(std::min(kReadPiece, values.size())));
     return status;
   }
 
@@ -368,7 +368,7 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
   }
 
   // One slice of the outermost dimension at a time keeps the buffer of doubles small.
-  const bool isSliced = outermost < rank && values.size() > kPiece;
+  const bool isSliced = outermost < rank && values.size() > kReadPiece;
   const std::size_t slices = isSliced ? std::exchange(count[outermost], 1) : 1;
   std::vector<double> box(values.size() / slices);
   bool fits = true;

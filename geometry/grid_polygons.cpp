@@ -263,7 +263,7 @@ FileResult ReadPolygons(const std::string& path, const std::string* attribute, i
   return result;
 }
 
-constexpr double kReading = 0.3;
+constexpr double kReadingShare = 0.3;
 
 }  // namespace
 
@@ -277,7 +277,7 @@ FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS_Polygon(GridGeometry g
   if (const std::string problem = geometry.Problem(); !problem.empty()) return refused(problem);
   if (file.attribute.empty()) return refused("no attribute is selected");
   CYbShapeData shapes;
-  FileResult result = ReadPolygons(file.path, &file.attribute, file.axisUnit, shapes, progress.Part(0, kReading));
+  FileResult result = ReadPolygons(file.path, &file.attribute, file.axisUnit, shapes, progress.Part(0, kReadingShare));
   if (!result.Ok()) return result;
   std::vector<float> codes;
   std::size_t left = 0;
@@ -293,7 +293,7 @@ FileResult CTvn2DOrthoRotatedGridData::CreateGridData_GIS_Polygon(GridGeometry g
   }
   try {
     std::vector<float> values(geometry.CellCount(), fill);
-    PutPolygons(shapes.GetData(), codes, geometry, deleteValue, values, progress.Part(kReading, 1));
+    PutPolygons(shapes.GetData(), codes, geometry, deleteValue, values, progress.Part(kReadingShare, 1));
     result.error = TakeValues(std::move(geometry), std::move(values), deleteValue, kWholeNumberUnit, quantity::kCode);
   } catch (const std::bad_alloc&) {
     return refused("there is no memory for the grid");
@@ -313,12 +313,12 @@ FileResult CTvn2DOrthoRotatedGridData::MakeCatchmentGriddataFromShapefile(const 
   };
   if (const std::string problem = geometry.Problem(); !problem.empty()) return refused(problem);
   CTvnShapeData shapes;
-  FileResult result = ReadPolygons(path, nullptr, axisUnit, shapes, progress.Part(0, kReading));
+  FileResult result = ReadPolygons(path, nullptr, axisUnit, shapes, progress.Part(0, kReadingShare));
   if (!result.Ok()) return result;
   Envelope extent;
   if (!shapes.GetTranscribingRect(extent)) return refused("it holds no polygon");
   try {
-    std::vector<float> values = DomainOfPolygons(shapes.GetData(), geometry, progress.Part(kReading, 1));
+    std::vector<float> values = DomainOfPolygons(shapes.GetData(), geometry, progress.Part(kReadingShare, 1));
     if (std::all_of(values.begin(), values.end(), [](float value) { return value == kUsualDeleteValue; })) {
       const Envelope grid = EnvelopeOf(geometry);
       return refused(
