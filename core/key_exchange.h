@@ -6,6 +6,7 @@
 #include <limits>
 #include <string>
 #include <string_view>
+#include <type_traits>
 #include <vector>
 
 #include "core/file_name.h"
@@ -45,6 +46,11 @@ class DeclaredKey {
   /// The file holds the base unit of the quantity.
   DeclaredKey& Quantity(int itemType) {
     return AddFacts([&](KeyFacts& facts) { facts.itemType = itemType; });
+  }
+  /// A quantity that the node's values decide: asked only by a walk that needs it.
+  template <class Ask>
+  requires std::is_invocable_r_v<int, const Ask&> DeclaredKey& Quantity(const Ask& ask) {
+    return AddFacts([&](KeyFacts& facts) { facts.itemType = ask(); });
   }
   /// A unit that never changes.
   DeclaredKey& Unit(std::string_view text) {

@@ -122,7 +122,7 @@ CData2DKvf::CData2DKvf(Data2DKind kind, Condition takesPart, CYbSEKvfBase* paren
 
 void CData2DKvf::ExchangeKeys(KeyExchange& keys) {
   keys("Type", Type).OneOf(kSources);
-  keys("FixedValue", FixedValue).Quantity(GetItemType());
+  keys("FixedValue", FixedValue).Quantity([this] { return GetItemType(); });
   keys("InterpMethod", InterpMethod).OneOf(kInterpolationMethods);
   // Files of before version 4 were all interpolated bilinearly, whatever they say.
   if (keys.Section() && keys.DocVersion() < 4) InterpMethod = 0;

@@ -91,7 +91,7 @@ std::unique_ptr<CUnSatInitConditionLayerItemKvf> CUnSatInitConditionLayerListKvf
 void CUnSatInitConditionLayerListKvf::ExchangeKeys(KeyExchange& keys) {
   keys("DistributionType", DistributionType)
       .OneOf(MayBeFullyDistributed() ? KeyChoices(kSoilDistributions) : KeyChoices(kSoilDistributionsWithoutGrid));
-  keys("Distribution_UniformValue", Distribution_UniformValue).Quantity(GetItemType());
+  keys("Distribution_UniformValue", Distribution_UniformValue).Quantity([this] { return GetItemType(); });
   keys.Count("NumberOfLayers", *this);
 }
 

@@ -76,7 +76,7 @@ CSZVerDiscrInternalBoundaryPropKvf::CSZVerDiscrInternalBoundaryPropKvf(CYbSEKvfB
 
 void CSZVerDiscrInternalBoundaryPropKvf::ExchangeKeys(KeyExchange& keys) {
   CodedZoneProp::ExchangeKeys(keys);
-  keys("FixedValue", FixedValue).Quantity(GetBoundaryItemType());
+  keys("FixedValue", FixedValue).Quantity([this] { return GetBoundaryItemType(); });
   keys("BoundaryType", BoundaryType).OneOf(kBoundaryTypes);
   keys("Type", Type);
   keys("HeadControlLeakage", HeadControlLeakage).OneOf(kLeakages);
