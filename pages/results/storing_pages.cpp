@@ -117,9 +117,9 @@ std::string COutputGridSeriesListDlg::CostText() const {
   for (const FileCost& file : cost.files)
     text += fmt::format("{}{} {}", &file == &cost.files.front() ? ": " : ", ", file.file->suffix,
                         file.unknownTypes == file.types ? "not known" : SizeInWords(file.bytes));
-  const std::string folder =
-      Context().document.PathName().empty() ? std::string() : Context().document.getResultFolder();
-  if (const auto free = FreeBytesAt(ResolvedPath(folder, {})); !folder.empty() && free)
+  // Of the disk that the results will be on, where it is known what they take.
+  if (Context().document.PathName().empty() || !(cost.bytes > 0)) return text;
+  if (const auto free = FreeBytesAt(ResolvedPath(Context().document.getResultFolder(), {})))
     text +=
         fmt::format(". The disk has {} left{}", SizeInWords(*free), cost.bytes > *free ? ", which is too little" : "");
   return text;
