@@ -8,6 +8,9 @@ namespace tervane::feature_rules_test {
 namespace {
 
 using namespace feature;
+// Methods of components bear these names, too.
+using feature::kLinearReservoir;
+using feature::kTwoLayer;
 
 TEST(FeatureRules, TheFirstBrokenRuleIsTold) {
   const RequirementMask soil = kUnsaturated | kEvapotranspiration;

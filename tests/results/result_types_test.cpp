@@ -12,6 +12,10 @@
 namespace tervane::result_types_test {
 namespace {
 
+// Nodes and methods of components bear these names, too.
+using feature::kOverland;
+using feature::kTwoLayer;
+
 const ResultCatalogue& Own() { return ResultCatalogue::Own(); }
 
 std::vector<int> CodesOf(CatalogueAnswer<int> (ResultCatalogue::*operation)(RequirementMask, std::span<int>) const,
