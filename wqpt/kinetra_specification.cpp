@@ -287,6 +287,8 @@ int CKinetraSpecKvf::ValidateData() {
       AddWarning("A process template is on and no file is chosen", key);
     else if (!solver.Content().problem.empty())
       AddWarning("The process template cannot be read", key, solver.Content().problem);
+    else if (!solver.Content().gap.empty())
+      AddWarning("The process template is read in part", key, solver.Content().gap);
     for (const std::string& odd : solver.Content().Oddities()) AddWarning("The process template is odd", key, odd);
   }
   return 1;

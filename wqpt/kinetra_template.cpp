@@ -91,12 +91,25 @@ CKinetraSolverItem ReadItem(KvfNode* section, Kind kind) {
   return item;
 }
 
-/// Calls `take` with the numbered sections from 1 on, until a number is missing.
-void ForEachNumbered(KvfNode* section, const char* name, const auto& take) {
+int SectionCount(KvfNode* section) {
+  int count = 0;
+  for (int number = 1; KvfNode* node = kvfNodeByNum(section, number); ++number) count += kvfIsSection(node);
+  return count;
+}
+
+/// Calls `take` with the numbered sections from 1 on, until a number is missing. Gives what is left behind that.
+std::string ForEachNumbered(KvfNode* section, const char* name, const auto& take) {
   for (int number = 1;; ++number) {
-    KvfNode* found = kvfSectionByNameNum(section, fmt::format(fmt::runtime(name), number), 1);
-    if (!found) return;
-    take(found);
+    const std::string wanted = fmt::format(fmt::runtime(name), number);
+    KvfNode* found = kvfSectionByNameNum(section, wanted, 1);
+    if (found) {
+      take(found);
+      continue;
+    }
+    const int left = SectionCount(section) - (number - 1);
+    if (left <= 0) return {};
+    return fmt::format("{} is missing, so that {} behind it {} not read", wanted,
+                       left == 1 ? "1 section" : fmt::format("{} sections", left), left == 1 ? "is" : "are");
   }
 }
 
@@ -118,9 +131,12 @@ KinetraTemplate ReadTemplate(const std::string& path) {
     return read;
   }
   if (KvfNode* target = kvfTargetByNameNum(file, kTarget, 1)) {
-    for (const KinetraSection& row : kTemplateSections)
-      ForEachNumbered(kvfSectionByNameNum(target, row.section, 1), row.item,
-                      [&](KvfNode* section) { (read.*row.items).push_back(ReadItem(section, row.kind)); });
+    for (const KinetraSection& row : kTemplateSections) {
+      const std::string gap =
+          ForEachNumbered(kvfSectionByNameNum(target, row.section, 1), row.item,
+                          [&](KvfNode* section) { (read.*row.items).push_back(ReadItem(section, row.kind)); });
+      if (read.gap.empty()) read.gap = gap;
+    }
     ForEachNumbered(kvfSectionByNameNum(target, kEquations, 1), kEquation,
                     [&](KvfNode* section) { ReadEquation(section, read); });
   } else {

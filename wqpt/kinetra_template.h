@@ -53,6 +53,7 @@ struct CKinetraSolverItem {
 struct KinetraTemplate {
   std::vector<CKinetraSolverItem> stateVariables, constants, forcings, auxiliaries, processes, derivedOutputs;
   std::string problem;  ///< Why the file could not be read; empty for one that was, and where none is named.
+  std::string gap;      ///< The first number that is missing, so that what stands behind it is not read; or empty.
   std::string path;
   FileStamps stamps;  ///< Of the file when it was read.
 

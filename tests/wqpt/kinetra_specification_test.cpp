@@ -154,6 +154,12 @@ TEST_F(Kinetra, WhatIsNoTemplateIsEmptyAndSaysWhy) {
                                                              "} section CONSTANT_2 { SYMBOL = \"A\"; } }")))
                   ->Oddities(),
               ElementsAre(testing::HasSubstr("symbol A")));
+  // Behind a number that is missing nothing is read, which is told.
+  const auto cut = ReadKinetraTemplate(folder_.Write(
+      "gap.kinetra", TemplateText("section CONSTANTS { section CONSTANT_1 { SYMBOL = \"a\"; } section CONSTANT_3 { "
+                                  "SYMBOL = \"c\"; } section CONSTANT_4 { SYMBOL = \"d\"; } }")));
+  EXPECT_THAT(cut->constants, testing::SizeIs(1));
+  EXPECT_EQ(cut->gap, "CONSTANT_2 is missing, so that 2 sections behind it are not read");
 }
 
 TEST_F(Kinetra, OpeningBringsSpeciesAndValuesOfActiveCompartments) {
