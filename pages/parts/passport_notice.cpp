@@ -42,7 +42,7 @@ std::string NoticeOf(const CYbSEDlgBase& page) {
                                  passport->begun, passport->outcome);
   // The page waits for no file to be read; the command line holds contents against each other.
   const std::vector<InputChange> changes = ChangedInputs(*passport, true);
-  if (!changes.empty()) text += fmt::format("\nWritten anew since then: {}.", ListOf(changes, passport->setup));
+  if (!changes.empty()) text += fmt::format("\nWritten anew or gone since then: {}.", ListOf(changes, passport->setup));
   return text;
 }
 

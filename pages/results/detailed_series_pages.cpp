@@ -344,19 +344,14 @@ MapContent CDetailedFvrTSOutputDlg::Map() {
 
 // ---- What a run tells
 
-std::string ResultPageOf(const CYbSEDlgBase& page, std::string (CFlowModelDoc::*file)() const) {
-  const auto* document = dynamic_cast<const CFlowModelDoc*>(&page.Context().document);
-  return document && !document->PathName().empty() ? ResolvedPath((document->*file)(), {}) : std::string();
-}
-
-void DescribeDetailedResults(PageForm& form, DetailedResultKvf& /*node*/, CYbSEDlgBase& page) {
+/// The page that a run has written to that file.
+template <std::string (CFlowModelDoc::*file)() const>
+void DescribeResultPage(PageForm& form, DetailedResultKvf& /*node*/, CYbSEDlgBase& page) {
   DescribePassport(form, page);
-  form.Report([&page] { return ResultPageOf(page, &CFlowModelDoc::DetailedTimeSeriesPage); });
-}
-
-void DescribeDetailedRiverResults(PageForm& form, DetailedResultKvf& /*node*/, CYbSEDlgBase& page) {
-  DescribePassport(form, page);
-  form.Report([&page] { return ResultPageOf(page, &CFlowModelDoc::DetailedRiverTimeSeriesPage); });
+  form.Report([&page] {
+    const auto* document = dynamic_cast<const CFlowModelDoc*>(&page.Context().document);
+    return document && !document->PathName().empty() ? ResolvedPath((document->*file)(), {}) : std::string();
+  });
 }
 
 }  // namespace
@@ -365,8 +360,8 @@ std::span<const PageRow> DetailedSeriesPages() {
   static constexpr PageRow kRows[] = {
       PageIs<CDetailedTSOutputDlg, CDetailedTSOutputListKvf>(kDetailedSeriesPage),
       PageIs<CDetailedFvrTSOutputDlg, CDetailedFvrTSOutputListKvf>(kDetailedRiverSeriesPage),
-      DescribedBy<DescribeDetailedResults>(kDetailedResultPage),
-      DescribedBy<DescribeDetailedRiverResults>(kDetailedRiverResultPage),
+      DescribedBy<DescribeResultPage<&CFlowModelDoc::DetailedTimeSeriesPage>>(kDetailedResultPage),
+      DescribedBy<DescribeResultPage<&CFlowModelDoc::DetailedRiverTimeSeriesPage>>(kDetailedRiverResultPage),
   };
   return kRows;
 }

@@ -128,7 +128,7 @@ TEST_F(ViewerPage, TellsTheRunAndWhatWasWrittenSince) {
   EXPECT_THAT(text(), HasSubstr("Of the run that jane began on , 1970-01-01 00:00:01 UTC. The run is done.\n"));
   folder.Write("rain.nds0", "very wet");
   folder.Write("karup.tvd", test::SetupText(14, "# another\n"));
-  EXPECT_THAT(text(), HasSubstr("Written anew since then: the setup and rain.nds0."));
+  EXPECT_THAT(text(), HasSubstr("Written anew or gone since then: the setup and rain.nds0."));
   folder.Write("karup_results/karup_Passport.tvd", test::SetupText(14, ""));
   page->Form().ForEach([&](Control& control) {
     if (control.label == "Open the Setup That Made This") page->Press(control);
