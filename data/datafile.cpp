@@ -173,13 +173,14 @@ struct DataFile::State {
 
   /// Reads one step (and layer) that stands in the order of the buffer.
   std::string ReadInOrder(const ItemStorage& storage, std::vector<std::size_t> start, std::vector<std::size_t> count,
-                          std::size_t nx, std::span<float> values, const UnitConversion* conversion,
+                          const CellWindow& cells, std::span<float> values, const UnitConversion* conversion,
                           ProgressPart progress) const;
   std::string ReadByBoxes(const ItemStorage& storage, const DataItem& item, std::size_t step, std::optional<int> layer,
-                          std::span<float> values, const UnitConversion* conversion, ProgressPart progress) const;
+                          const CellWindow& cells, std::span<float> values, const UnitConversion* conversion,
+                          ProgressPart progress) const;
   /// Reads a band of a raster; the error names the file.
-  std::string ReadRaster(const ItemStorage& storage, const DataItem& item, std::span<float> values,
-                         const UnitConversion* conversion, ProgressPart progress) const;
+  std::string ReadRaster(const ItemStorage& storage, const DataItem& item, const CellWindow& cells,
+                         std::span<float> values, const UnitConversion* conversion, ProgressPart progress) const;
 };
 
 namespace {
@@ -309,8 +310,9 @@ class PieceReader {
 }  // namespace
 
 std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector<std::size_t> start,
-                                         std::vector<std::size_t> count, std::size_t nx, std::span<float> values,
-                                         const UnitConversion* conversion, ProgressPart progress) const {
+                                         std::vector<std::size_t> count, const CellWindow& cells,
+                                         std::span<float> values, const UnitConversion* conversion,
+                                         ProgressPart progress) const {
   bool fits = true;
   PieceReader reader(file.Id(), storage, values.size(), progress, [&](std::span<float> piece) {
     MarkMissing(storage, piece);
@@ -318,7 +320,8 @@ std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector
   });
   if (const int status = reader.Read(0, {std::move(start), std::move(count)}, values)) return netcdf::InWords(status);
   if (storage.isYTurned) {
-    const std::size_t layerSize = nx * storage.lengths[static_cast<std::size_t>(storage.y)];
+    const auto nx = static_cast<std::size_t>(cells.nx);
+    const std::size_t layerSize = cells.CellCount();
     for (std::size_t layer = 0; layer < values.size(); layer += layerSize) {
       for (std::size_t low = layer, high = layer + layerSize - nx; low < high; low += nx, high -= nx)
         std::swap_ranges(values.begin() + static_cast<std::ptrdiff_t>(low),
@@ -330,7 +333,7 @@ std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector
 }
 
 std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataItem& item, std::size_t step,
-                                         std::optional<int> layer, std::span<float> values,
+                                         std::optional<int> layer, const CellWindow& cells, std::span<float> values,
                                          const UnitConversion* conversion, ProgressPart progress) const {
   const std::size_t rank = storage.lengths.size();
   std::vector<std::size_t> start(rank, 0), count(rank, 1);
@@ -338,24 +341,23 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
   std::vector<std::ptrdiff_t> stride(rank, 0);
   std::ptrdiff_t origin = 0;
   std::size_t outermost = rank;
-  const auto nx = static_cast<std::ptrdiff_t>(item.geometry.nx);
-  const auto ny = static_cast<std::ptrdiff_t>(item.geometry.ny);
-  const auto place = [&](int dimension, std::ptrdiff_t distance, bool isTurned) {
+  const auto place = [&](int dimension, std::ptrdiff_t distance, bool isTurned, int first, int size) {
     if (dimension < 0) return;
     const auto d = static_cast<std::size_t>(dimension);
-    count[d] = storage.lengths[d];
+    count[d] = static_cast<std::size_t>(size);
+    start[d] = isTurned ? storage.lengths[d] - static_cast<std::size_t>(first + size) : static_cast<std::size_t>(first);
     stride[d] = isTurned ? -distance : distance;
-    if (isTurned) origin += distance * static_cast<std::ptrdiff_t>(storage.lengths[d] - 1);
+    if (isTurned) origin += distance * static_cast<std::ptrdiff_t>(size - 1);
     outermost = std::min(outermost, d);
   };
-  place(storage.x, 1, storage.isXTurned);
-  place(storage.y, nx, storage.isYTurned);
+  place(storage.x, 1, storage.isXTurned, cells.i, cells.nx);
+  place(storage.y, cells.nx, storage.isYTurned, cells.j, cells.ny);
   if (storage.z >= 0 && layer) {
     const auto z = static_cast<std::size_t>(storage.z);
     start[z] = storage.isZTurned ? storage.lengths[z] - 1 - static_cast<std::size_t>(*layer)
                                  : static_cast<std::size_t>(*layer);
   } else {
-    place(storage.z, nx * ny, storage.isZTurned);
+    place(storage.z, static_cast<std::ptrdiff_t>(cells.CellCount()), storage.isZTurned, 0, item.geometry.nz);
   }
   if (storage.time >= 0) {
     const auto time = static_cast<std::size_t>(storage.time);
@@ -370,6 +372,7 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
   // One slice of the outermost dimension at a time keeps the buffer of doubles small.
   const bool isSliced = outermost < rank && values.size() > kReadPiece;
   const std::size_t slices = isSliced ? std::exchange(count[outermost], 1) : 1;
+  const std::size_t firstSlice = isSliced ? start[outermost] : 0;
   std::vector<double> box(values.size() / slices);
   bool fits = true;
   for (std::size_t slice = 0; slice < slices; ++slice) {
@@ -377,7 +380,7 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
     progress.Report(static_cast<double>(slice) / static_cast<double>(slices));
     std::ptrdiff_t target = origin;
     if (isSliced) {
-      start[outermost] = slice;
+      start[outermost] = firstSlice + slice;
       target += stride[outermost] * static_cast<std::ptrdiff_t>(slice);
     }
     {
@@ -398,15 +401,15 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
   return fits ? std::string() : kTooLarge;
 }
 
-std::string DataFile::State::ReadRaster(const ItemStorage& storage, const DataItem& item, std::span<float> values,
-                                        const UnitConversion* conversion, ProgressPart progress) const {
+std::string DataFile::State::ReadRaster(const ItemStorage& storage, const DataItem& item, const CellWindow& cells,
+                                        std::span<float> values, const UnitConversion* conversion,
+                                        ProgressPart progress) const {
   constexpr int kRows = 256;  // as many as the pieces of most rasters have
-  const int nx = item.geometry.nx, ny = item.geometry.ny;
-  for (int j = 0; j < ny; j += kRows) {
+  for (int j = 0; j < cells.ny; j += kRows) {
     progress.ThrowIfCancelled();
-    progress.Report(static_cast<double>(j) / ny);
-    const CellWindow rows{0, j, nx, std::min(kRows, ny - j)};
-    const std::size_t first = static_cast<std::size_t>(j) * static_cast<std::size_t>(nx);
+    progress.Report(static_cast<double>(j) / cells.ny);
+    const CellWindow rows{cells.i, cells.j + j, cells.nx, std::min(kRows, cells.ny - j)};
+    const std::size_t first = static_cast<std::size_t>(j) * static_cast<std::size_t>(cells.nx);
     std::string error = raster->Read(storage.variable, rows, values.subspan(first, rows.CellCount()));
     if (!error.empty()) return error;
   }
@@ -461,7 +464,8 @@ const std::vector<std::string>& DataFile::Notes() const { return state_->header.
 std::size_t DataFile::SizeOf(const ValueSelection& selection) const {
   if (selection.item < 1 || static_cast<std::size_t>(selection.item) > Items().size()) return 0;
   const DataItem& item = Items()[static_cast<std::size_t>(selection.item - 1)];
-  return selection.steps * (selection.layer ? item.CellsOfLayer() : item.Cells());
+  const std::size_t cells = selection.cells ? selection.cells->CellCount() : item.CellsOfLayer();
+  return selection.steps * cells * (selection.layer ? 1 : static_cast<std::size_t>(item.geometry.nz));
 }
 
 std::string DataFile::Read(const ValueSelection& selection, std::span<float> values, std::optional<int> inBaseUnitOf,
@@ -480,6 +484,12 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
   if (selection.layer && (*selection.layer < 0 || *selection.layer >= item.geometry.nz)) {
     return refused(
         fmt::format("there is no layer {}: the item {} has {}", *selection.layer + 1, item.name, item.geometry.nz));
+  }
+  const CellWindow cells = selection.cells.value_or(CellWindow{0, 0, item.geometry.nx, item.geometry.ny});
+  if (selection.cells && (item.dimensions < 2 || cells.i < 0 || cells.j < 0 || cells.nx < 1 || cells.ny < 1 ||
+                          cells.nx > item.geometry.nx - cells.i || cells.ny > item.geometry.ny - cells.j)) {
+    return refused(fmt::format("the cells {}, {} to {}, {} do not lie on the grid of {}", cells.i, cells.j,
+                               cells.i + cells.nx - 1, cells.j + cells.ny - 1, item.name));
   }
   if (values.size() != SizeOf(selection)) {
     return refused(fmt::format("{} values were asked for, {} are there", values.size(), SizeOf(selection)));
@@ -506,7 +516,7 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
   const std::size_t size = calls == 0 ? 0 : values.size() / calls;
   try {
     if (state_->raster && values.empty()) return {};
-    if (state_->raster) return state_->ReadRaster(storage, item, values, converter, progress);
+    if (state_->raster) return state_->ReadRaster(storage, item, cells, values, converter, progress);
     for (std::size_t i = 0; i < calls; ++i) {
       const std::span<float> part = values.subspan(i * size, size);
       const auto all = static_cast<double>(calls);
@@ -522,10 +532,18 @@ std::string DataFile::Read(const ValueSelection& selection, std::span<float> val
           start[static_cast<std::size_t>(storage.z)] = static_cast<std::size_t>(*selection.layer);
           count[static_cast<std::size_t>(storage.z)] = 1;
         }
-        reason = state_->ReadInOrder(storage, std::move(start), std::move(count),
-                                     static_cast<std::size_t>(item.geometry.nx), part, converter, told);
+        if (selection.cells && storage.x >= 0 && storage.y >= 0) {
+          // In the file's order, which may be from the north.
+          const auto x = static_cast<std::size_t>(storage.x), y = static_cast<std::size_t>(storage.y);
+          start[x] = static_cast<std::size_t>(cells.i);
+          count[x] = static_cast<std::size_t>(cells.nx);
+          count[y] = static_cast<std::size_t>(cells.ny);
+          start[y] = storage.isYTurned ? storage.lengths[y] - static_cast<std::size_t>(cells.j + cells.ny)
+                                       : static_cast<std::size_t>(cells.j);
+        }
+        reason = state_->ReadInOrder(storage, std::move(start), std::move(count), cells, part, converter, told);
       } else {
-        reason = state_->ReadByBoxes(storage, item, selection.step + i, selection.layer, part, converter, told);
+        reason = state_->ReadByBoxes(storage, item, selection.step + i, selection.layer, cells, part, converter, told);
       }
       if (!reason.empty()) {
         return refused(fmt::format("item {}, step {}: {}", selection.item, selection.step + i + 1, reason));

@@ -102,7 +102,8 @@ struct ItemStatistics {
 struct ValueSelection {
   int item = 1;
   std::size_t step = 0, steps = 1;
-  std::optional<int> layer;  ///< Without one all layers, from the bottom.
+  std::optional<int> layer;              ///< Without one all layers, from the bottom.
+  std::optional<CellWindow> cells = {};  ///< Of a grid; without it all of a layer.
 };
 
 /// An open data file. Opening reads the header and the times; values are read when they are asked for. Many threads may

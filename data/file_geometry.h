@@ -32,6 +32,13 @@ struct FileGeometry {
   bool operator==(const FileGeometry&) const = default;
 };
 
+/// A part of a grid, counted from its lower left cell.
+struct CellWindow {
+  int i = 0, j = 0, nx = 0, ny = 0;
+
+  std::size_t CellCount() const { return static_cast<std::size_t>(nx) * static_cast<std::size_t>(ny); }
+};
+
 /// The cells as a model's grid has them, those of a grid without a place 1 wide. Gives why they are none, "cells of 50
 /// x 25, square ones were expected", or nothing; then `grid` is as it was.
 [[nodiscard]] std::string ToModelGrid(const FileGeometry& file, GridGeometry& grid);

@@ -33,13 +33,6 @@ struct RasterFacts {
   std::vector<std::string> notes;  ///< What the user should know: bands that were left out, an unknown place.
 };
 
-/// A part of a grid, counted from its lower left cell.
-struct CellWindow {
-  int i = 0, j = 0, nx = 0, ny = 0;
-
-  std::size_t CellCount() const { return static_cast<std::size_t>(nx) * static_cast<std::size_t>(ny); }
-};
-
 /// An open raster. Opening reads what the file tells of itself; values are read when they are asked for. Errors name
 /// the file, say what is wrong, and what to do.
 class RasterFile {

@@ -123,6 +123,16 @@ TEST_F(ForeignFile, ValuesComeInOurOrderWhateverTheFilesOrder) {
       ValueSelection top;
       top.layer = 1;
       EXPECT_EQ(Values(file, top), std::vector<float>(row.values.begin() + 4, row.values.end())) << text;
+      ValueSelection column;
+      column.cells = CellWindow{1, 0, 1, 2};
+      EXPECT_EQ(Values(file, column), (std::vector<float>{row.values[1], row.values[3], row.values[5], row.values[7]}))
+          << text;
+      ValueSelection cell = top;
+      cell.cells = CellWindow{0, 1, 1, 1};
+      EXPECT_EQ(Values(file, cell), std::vector<float>{row.values[6]}) << text;
+      cell.cells = CellWindow{1, 1, 2, 1};
+      std::vector<float> two(2);
+      EXPECT_NE(file.Read(cell, two), "");
     }
   }
 }
