@@ -26,7 +26,13 @@ void LetStandOut(MapContent& map, const Highlight& highlighted) {
 
 bool LooksSame(const MapContent& a, const MapContent& b) {
   return a.grids == b.grids && a.shapes == b.shapes && a.lines == b.lines && a.points == b.points &&
-         a.domain == b.domain && a.area == b.area && a.message == b.message;
+         a.domain == b.domain && a.area == b.area && a.message == b.message && a.arrows == b.arrows;
+}
+
+bool HasSameColors(const GridLayer& a, const GridLayer& b) {
+  return a.isCodes == b.isCodes && a.highlighted.code == b.highlighted.code && a.range == b.range &&
+         a.names == b.names && a.classes == b.classes && a.isHillshaded == b.isHillshaded && a.ramp == b.ramp &&
+         a.scale == b.scale;
 }
 
 bool LooksSame(const SectionContent& a, const SectionContent& b) {
@@ -98,6 +104,7 @@ std::string Summary(const MapContent& content) {
     if (layer.painted) parts.back() += " by " + layer.painted->title;
   }
   if (!content.points.empty()) parts.push_back(fmt::format("{} points", points));
+  if (content.arrows) parts.push_back("arrows");
   if (std::string standsOut = HighlightText(content); !standsOut.empty()) parts.push_back(std::move(standsOut));
   if (content.request) parts.push_back(fmt::format("asks \"{}\"", content.request->prompt));
   return fmt::format("{}", fmt::join(parts, ", "));

@@ -53,6 +53,25 @@ struct CellClass {
   bool operator==(const CellClass&) const = default;
 };
 
+/// The colours of a scale from low to high.
+enum class Ramp {
+  OfQuantity,  ///< What suits the values: those of ground for elevations, else `Amounts`.
+  Amounts,
+  Terrain,
+  VioletToYellow,  ///< These three grow lighter evenly, so that equal steps look equal.
+  BlueToYellow,    ///< Also told apart by those who do not tell red from green.
+  VioletToOrange,
+  Difference,  ///< Blue below the middle, red above.
+};
+
+/// A class of a scale that has borders of its own.
+struct ScaleClass {
+  double upTo = 0;     ///< The largest value, in the grid's unit.
+  unsigned color = 0;  ///< Red, green, blue.
+
+  bool operator==(const ScaleClass&) const = default;
+};
+
 /// A grid on a map.
 struct GridLayer {
   std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid;
@@ -67,8 +86,22 @@ struct GridLayer {
   /// Cells of other values are left out.
   std::vector<CellClass> classes = {};
   bool isHillshaded = false;  ///< Of elevations: slopes are lit from the north-west.
+  Ramp ramp = Ramp::OfQuantity;
+  /// In the place of ramp and range: ascending classes. What lies beyond the last one has its colour.
+  std::vector<ScaleClass> scale = {};
 
   bool operator==(const GridLayer&) const = default;
+};
+
+/// Whether cells of equal values look the same in both: all but the values, the legend and the transparency.
+bool HasSameColors(const GridLayer& a, const GridLayer& b);
+
+/// Flow through the cells of a grid, as arrows that keep apart however near the map is seen.
+struct ArrowLayer {
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> x, y;  ///< Along the axes of the grid.
+  double strongest = 0;  ///< The flow of the longest arrow, so that a length means the same at all times.
+
+  bool operator==(const ArrowLayer&) const = default;
 };
 
 /// Shapes over a grid.
@@ -152,6 +185,7 @@ struct MapContent {
   std::vector<ShapeLayer> shapes;
   std::vector<LineLayer> lines;
   std::vector<PointLayer> points;
+  std::optional<ArrowLayer> arrows = {};  ///< Over the grids, below all else.
   /// A line over all grids, shapes and lines that shows where the model lies; nobody points at it. Null for none.
   std::shared_ptr<const CYbShapeData> domain = {};
   std::optional<Envelope> area;  ///< Shown at first; the envelope of all layers when nothing is said.

@@ -54,7 +54,7 @@ MapCanvas::~MapCanvas() = default;
 
 void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
   const DisplayUnits chosen = units ? *units : DisplayUnits();
-  const std::optional<Envelope> before = WholeArea();
+  const std::optional<Envelope> area = WholeArea();
   const bool wasEmpty = content_.IsEmpty();
   content_ = std::move(content);
   units_ = chosen;
@@ -63,11 +63,7 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
   for (const GridLayer& grid : content_.grids) {
     const int unitKey = units_.UnitKey(grid.grid->ItemType());
     const auto same = std::ranges::find_if(old, [&](const auto& layer) {
-      // How transparent a layer is, or whether it has a legend, does not change its colours.
-      return layer && layer->grid.grid == grid.grid && layer->grid.isCodes == grid.isCodes &&
-             layer->grid.highlighted.code == grid.highlighted.code && layer->grid.range == grid.range &&
-             layer->grid.names == grid.names && layer->grid.classes == grid.classes &&
-             layer->grid.isHillshaded == grid.isHillshaded && layer->unitKey == unitKey;
+      return layer && layer->grid.grid == grid.grid && HasSameColors(layer->grid, grid) && layer->unitKey == unitKey;
     });
     if (same != old.end()) {
       layers_.push_back(std::move(*same));
@@ -77,26 +73,39 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
     layers_.push_back(std::make_unique<Layer>());
     layers_.back()->grid = grid;
     layers_.back()->unitKey = unitKey;
+    // Another step of the same item: the one before stays until the new picture is there.
+    const std::size_t place = layers_.size() - 1;
+    const Layer* before = place < old.size() ? old[place].get() : nullptr;
+    if (before && before->unitKey == unitKey && HasSameColors(before->grid, grid) &&
+        before->grid.grid->ItemName() == grid.grid->ItemName() &&
+        before->grid.grid->ItemType() == grid.grid->ItemType() &&
+        before->grid.grid->Geometry() == grid.grid->Geometry()) {
+      layers_.back()->picture = old[place]->picture;
+      layers_.back()->isOld = true;
+    }
     Prepare(*layers_.back());
   }
+  isPassing_ = false;
   shapes_.clear();
   for (const ShapeLayer& layer : content_.shapes) shapes_.emplace_back(layer);
   domain_.reset();
   if (content_.domain) domain_.emplace(ShapeLayer{.shapes = content_.domain, .isDomain = true});
   lines_.clear();
   for (const LineLayer& layer : content_.lines) lines_.emplace_back(layer, units_);
-  if (wasEmpty || WholeArea() != before) isFitted_ = true;
+  if (wasEmpty || WholeArea() != area) isFitted_ = true;
   Arrange();
 }
 
 void MapCanvas::Prepare(Layer& layer) {
   if (layer.grid.grid->Geometry().CellCount() <= kCellsAtOnce) {
     layer.picture = GridPicture::Make(layer.grid, units_, *layer.isGivenUp);
+    layer.isOld = false;
     return;
   }
   auto promise = std::make_shared<QPromise<Made>>();
   connect(&layer.watcher, &QFutureWatcher<Made>::finished, this, [this, &layer] {
     layer.picture = layer.watcher.result();
+    layer.isOld = false;
     Arrange();
   });
   layer.watcher.setFuture(promise->future());
@@ -109,15 +118,35 @@ void MapCanvas::Prepare(Layer& layer) {
 }
 
 bool MapCanvas::IsPreparing() const {
-  return std::ranges::any_of(layers_, [](const auto& layer) { return !layer->picture; });
+  return std::ranges::any_of(layers_, [](const auto& layer) { return !layer->picture || layer->isOld; });
+}
+
+void MapCanvas::ShowFrame(const GridLayer& grid, std::shared_ptr<const GridPicture> picture,
+                          std::optional<ArrowLayer> arrows, bool isPassing) {
+  if (layers_.empty()) return;
+  content_.grids.front() = grid;
+  content_.arrows = std::move(arrows);
+  // Another one, so that a picture in the making is given up.
+  layers_.front() = std::make_unique<Layer>();
+  layers_.front()->grid = grid;
+  layers_.front()->unitKey = units_.UnitKey(grid.grid->ItemType());
+  layers_.front()->picture = std::move(picture);
+  isPassing_ = isPassing;
+  if (isPointed_ && gesture_ == Gesture::None) emit PointedAt(TextAt(window_.ToMap(draggedTo_)));
+  Redraw();
+}
+
+const GridPicture* MapCanvas::PictureOf(std::size_t grid) const {
+  return grid < layers_.size() && !layers_[grid]->isOld ? layers_[grid]->picture.get() : nullptr;
 }
 
 void MapCanvas::WaitUntilReady() {
   if (!IsPreparing()) return;
   for (const auto& layer : layers_) {
-    if (layer->picture) continue;
+    if (layer->picture && !layer->isOld) continue;
     layer->watcher.waitForFinished();
     layer->picture = layer->watcher.result();
+    layer->isOld = false;
   }
   Arrange();
 }
@@ -196,7 +225,7 @@ double MapCanvas::Reach() const { return Scaled(kReach) * window_.metresPerPixel
 MapPick MapCanvas::PickAt(MapPoint place) const {
   MapPick pick;
   pick.place = place;
-  if (!content_.grids.empty()) {
+  if (!content_.grids.empty() && !isPassing_) {
     const CTvn2DOrthoRotatedGridData& grid = *content_.grids.front().grid;
     double i = 0, j = 0;
     grid.GetCellCoordFromXYWorldCoord(place.x, place.y, i, j);
@@ -324,6 +353,7 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio, bool isScreen) {
   for (const auto& layer : layers_)
     if (layer->picture) layer->picture->Draw(painter, window_, pixelRatio, 1 - layer->grid.transparency);
   DrawVectors(painter, pixelRatio, isScreen);
+  DrawFlow(painter);
   DrawMarkers(painter);
   if (IsPreparing()) DrawPreparing(painter);
   painter.restore();

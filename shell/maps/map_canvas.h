@@ -28,6 +28,12 @@ class MapCanvas : public QWidget {
   /// made ready in another thread, and appear when they are.
   void SetContent(MapContent content, const DisplayUnits* units);
   const MapContent& Content() const { return content_; }
+  /// Shows the next step of the first grid and its flow in the place of the one before, which is all that changes. A
+  /// grid that is `passing` holds but some of the cells, so that nobody can point at one.
+  void ShowFrame(const GridLayer& grid, std::shared_ptr<const GridPicture> picture, std::optional<ArrowLayer> arrows,
+                 bool isPassing);
+  /// The pictures of the grids; null for one that is in the making.
+  const GridPicture* PictureOf(std::size_t grid) const;
   void SetPicked(std::function<void(const MapPick&)> picked) { content_.picked = std::move(picked); }
   /// Asks the user for a point or a line, or no longer; the same question asked again leaves what he has drawn.
   void Ask(std::optional<MapRequest> request);
@@ -82,6 +88,8 @@ class MapCanvas : public QWidget {
   void DrawVectors(QPainter& painter, double pixelRatio, bool isScreen);
   void DrawVectorPart(QPainter& painter, const DrawnMap& map) const;
   void DrawMarkers(QPainter& painter);
+  /// Flow, and at the top an arrow that tells what lengths mean.
+  void DrawFlow(QPainter& painter);
   void DrawPreparing(QPainter& painter);
   /// What is asked of the user and what he has drawn so far.
   void DrawRequest(QPainter& painter);
@@ -131,6 +139,7 @@ class MapCanvas : public QWidget {
   bool isSecondClick_ = false;
   bool isTaken_ = false;    ///< The last click gave a point that was asked for.
   bool isPointed_ = false;  ///< The pointer is over the map.
+  bool isPassing_ = false;  ///< The first grid has but some of its cells.
   QPointF pressedAt_, draggedTo_;
 };
 

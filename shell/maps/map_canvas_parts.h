@@ -28,6 +28,7 @@ struct MapCanvas::Layer {
   GridLayer grid;
   int unitKey = 0;
   std::shared_ptr<const GridPicture> picture;
+  bool isOld = false;  ///< The picture is that of the grid before, until the new one is ready.
   std::shared_ptr<std::atomic<bool>> isGivenUp = std::make_shared<std::atomic<bool>>(false);
   QFutureWatcher<std::shared_ptr<const GridPicture>> watcher;
 

@@ -9,6 +9,7 @@
 #include <cmath>
 
 #include "platform/item_types.h"
+#include "shell/maps/map_arrows.h"
 #include "shell/maps/map_canvas_parts.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -135,6 +136,28 @@ void MapCanvas::DrawScaleBar(QPainter& painter, const ScaleBar& scale) {
   if (halfAt + halfWidth + digit < start.x() + scale.pixels - digit)
     painter.drawText(QPointF(halfAt, baseline), scale.half);
   painter.drawText(QPointF(start.x() + scale.pixels - digit, baseline), scale.text);
+}
+
+void MapCanvas::DrawFlow(QPainter& painter) {
+  if (!content_.arrows) return;
+  const DrawnMap map = Drawn();
+  DrawArrows(painter, ArrowsOn(*content_.arrows, map), map);
+  const KeyArrow key = KeyOf(*content_.arrows, map, units_);
+  if (!(key.length > 4)) return;
+  const QFontMetricsF metrics(painter.font());
+  const double padding = Scaled(8), height = metrics.height() + padding;
+  const QRectF box(window_.rect.left() + Scaled(8), window_.rect.top() + Scaled(8),
+                   key.length + metrics.horizontalAdvance(key.text) + 3 * padding, height);
+  if (box.width() > window_.rect.width()) return;
+  QColor paper = palette().color(QPalette::Base);
+  paper.setAlpha(215);
+  painter.setPen(Qt::NoPen);
+  painter.setBrush(paper);
+  painter.drawRoundedRect(box, Scaled(4), Scaled(4));
+  const QPointF start(box.left() + padding, box.center().y());
+  DrawArrows(painter, {{start, start + QPointF(key.length, 0)}}, map);
+  painter.setPen(palette().color(QPalette::Text));
+  painter.drawText(box.adjusted(key.length + 2 * padding, 0, 0, 0), Qt::AlignLeft | Qt::AlignVCenter, key.text);
 }
 
 void DrawChip(QPainter& painter, const QRectF& chip, const QString& text, const QPalette& colors) {

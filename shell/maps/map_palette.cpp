@@ -7,6 +7,7 @@
 #include <array>
 #include <cmath>
 #include <limits>
+#include <span>
 
 #include "platform/item_types.h"
 #include "shell/widgets/qt_text.h"
@@ -17,11 +18,42 @@ namespace {
 
 /// From low to high: lighter to darker, so that the order is seen without colours too, and neither end is lost on white
 /// or dark paper.
-constexpr std::array<QRgb, 7> kRamp{0xfff6e7a1, 0xffc3dc8c, 0xff83c795, 0xff48aca5, 0xff3388ad, 0xff3a62a8, 0xff4b3c8f};
+constexpr std::array<QRgb, 7> kAmounts{0xfff6e7a1, 0xffc3dc8c, 0xff83c795, 0xff48aca5,
+                                       0xff3388ad, 0xff3a62a8, 0xff4b3c8f};
 
 /// Of the ground, from valleys to peaks.
 constexpr std::array<QRgb, 7> kTerrain{0xff7fa868, 0xffaac37c, 0xffdccf96, 0xffc7a26b,
                                        0xffa27a58, 0xff9b8b83, 0xfff1efec};
+
+// Their lightness, as the eye sees it, grows by equal steps.
+constexpr std::array<QRgb, 9> kVioletToYellow{0xff34004d, 0xff331e7f, 0xff02469f, 0xff046b93, 0xff098a98,
+                                              0xff08aa98, 0xff39ca81, 0xffa4da6c, 0xffefe670};
+constexpr std::array<QRgb, 9> kBlueToYellow{0xff00245f, 0xff1b3b6f, 0xff3a5178, 0xff596880, 0xff807d73,
+                                            0xff9c9577, 0xffbaac79, 0xffd9c57a, 0xfff8dd78};
+constexpr std::array<QRgb, 9> kVioletToOrange{0xff250147, 0xff4e015d, 0xff771962, 0xff9f3160, 0xffc34e59,
+                                              0xffe16f4e, 0xfff89547, 0xffffc165, 0xffffeba2};
+/// Both sides of the middle grow darker alike.
+constexpr std::array<QRgb, 9> kDifference{0xff0161bd, 0xff4b86cf, 0xff82a9db, 0xffb8cce6, 0xffeeeeee,
+                                          0xffe4c0ba, 0xffd69288, 0xffc56358, 0xffaf2b25};
+
+std::span<const QRgb> ColorsOf(Ramp ramp) {
+  switch (ramp) {
+    case Ramp::Terrain:
+      return kTerrain;
+    case Ramp::VioletToYellow:
+      return kVioletToYellow;
+    case Ramp::BlueToYellow:
+      return kBlueToYellow;
+    case Ramp::VioletToOrange:
+      return kVioletToOrange;
+    case Ramp::Difference:
+      return kDifference;
+    case Ramp::OfQuantity:
+    case Ramp::Amounts:
+      break;
+  }
+  return kAmounts;
+}
 
 /// Colours that are told apart side by side.
 constexpr std::array<QRgb, 20> kDistinct{0xff4e79a7, 0xfff28e2b, 0xff59a14f, 0xffe15759, 0xffb07aa1,
@@ -62,7 +94,7 @@ Range RangeOf(const CTvn2DOrthoRotatedGridData& grid, double smallest, double la
 }  // namespace
 
 QRgb RampColor(double part, Ramp ramp) {
-  const auto& colors = ramp == Ramp::Terrain ? kTerrain : kRamp;
+  const std::span<const QRgb> colors = ColorsOf(ramp);
   const double at = std::clamp(part, 0.0, 1.0) * static_cast<double>(colors.size() - 1);
   const auto low = std::min(static_cast<std::size_t>(at), colors.size() - 2);
   const double weight = at - static_cast<double>(low);
@@ -204,6 +236,8 @@ MapPalette MapPalette::Of(const GridLayer& layer, const DisplayUnits* units) {
     palette.MakeOwnClasses(layer.classes);
   else if (layer.isCodes)
     palette.MakeCodes(layer);
+  else if (!layer.scale.empty())
+    palette.MakeScale(layer.scale, ShownUnit(grid.ItemType(), grid.ItemUnit(), units));
   else
     palette.MakeClasses(layer, ShownUnit(grid.ItemType(), grid.ItemUnit(), units));
   return palette;
@@ -219,7 +253,8 @@ void MapPalette::MakeClasses(const GridLayer& layer, const ShownUnit& unit) {
     constexpr float kMost = std::numeric_limits<float>::max();
     range = RangeOf(*layer.grid, std::max(smallest, -kMost), std::min(largest, kMost));
   }
-  const Ramp ramp = layer.grid->ItemType() == quantity::kElevation ? Ramp::Terrain : Ramp::Amounts;
+  const bool isGround = layer.ramp == Ramp::OfQuantity && layer.grid->ItemType() == quantity::kElevation;
+  const Ramp ramp = isGround ? Ramp::Terrain : layer.ramp;
   // The numbers are to be nice in the unit in which the user sees them.
   legend_.isScale = true;
   const std::vector<double> shown = ClassBorders(unit.Shown(range.low), unit.Shown(range.high));
@@ -239,6 +274,22 @@ void MapPalette::MakeClasses(const GridLayer& layer, const ShownUnit& unit) {
     QString text = QString::fromUtf8("%1 – %2").arg(from, to);
     if (i == 0 && range.isOpenBelow) text = QCoreApplication::translate("MapPalette", "below %1").arg(to);
     if (i + 1 == classes && range.isOpenAbove) text = QCoreApplication::translate("MapPalette", "above %1").arg(from);
+    legend_.rows.insert(legend_.rows.begin(), {QColor(colors_.back()), text});
+  }
+}
+
+void MapPalette::MakeScale(const std::vector<ScaleClass>& classes, const ShownUnit& unit) {
+  kind_ = Kind::Scale;
+  legend_.isScale = true;
+  const std::size_t count = std::min<std::size_t>(classes.size(), kMostColors);
+  const auto shown = [&](std::size_t i) { return unit.Shown(classes[i].upTo); };
+  const double step = count > 1 ? shown(1) - shown(0) : 1;
+  for (std::size_t i = 0; i < count; ++i) {
+    upTo_.push_back(static_cast<float>(classes[i].upTo));
+    colors_.push_back(qRgb(0, 0, 0) | classes[i].color);
+    const QString to = NumberInSteps(shown(i), step);
+    const QString text = i == 0 ? QCoreApplication::translate("MapPalette", "up to %1").arg(to)
+                                : QString::fromUtf8("%1 – %2").arg(NumberInSteps(shown(i - 1), step), to);
     legend_.rows.insert(legend_.rows.begin(), {QColor(colors_.back()), text});
   }
 }
@@ -307,6 +358,10 @@ std::uint8_t MapPalette::ColorNumber(float value) const {
     case Kind::OwnClasses: {
       const auto found = std::ranges::find(ownValues_, value);
       return found == ownValues_.end() ? std::uint8_t{0} : static_cast<std::uint8_t>(1 + (found - ownValues_.begin()));
+    }
+    case Kind::Scale: {
+      const auto place = std::ranges::lower_bound(upTo_, value) - upTo_.begin();
+      return static_cast<std::uint8_t>(1 + std::min(place, static_cast<std::ptrdiff_t>(upTo_.size()) - 1));
     }
     case Kind::Classes:
       break;

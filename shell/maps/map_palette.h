@@ -24,9 +24,7 @@ std::vector<double> ClassBorders(double smallest, double largest);
 /// A number with as many decimals as multiples of the step need.
 QString NumberInSteps(double value, double step);
 
-/// What colours from low to high speak of.
-enum class Ramp { Amounts, Terrain };
-/// From low to high, `part` within 0 and 1.
+/// From low to high, `part` within 0 and 1; `Ramp::OfQuantity` as `Amounts`.
 QRgb RampColor(double part, Ramp ramp = Ramp::Amounts);
 /// Colours that are told apart side by side, one for each whole number from 0.
 QRgb CodeColor(std::size_t ordinal);
@@ -99,12 +97,13 @@ class MapPalette {
   /// What the user reads, from the top down: classes from the highest to the lowest, codes ascending.
   const LegendBlock& Legend() const { return legend_; }
   /// Single cells count: coarser levels must not lose them.
-  bool KeepsSingleCells() const { return kind_ != Kind::Classes; }
+  bool KeepsSingleCells() const { return kind_ != Kind::Classes && kind_ != Kind::Scale; }
 
  private:
-  enum class Kind { Classes, Codes, Highlighted, OwnClasses };
+  enum class Kind { Classes, Scale, Codes, Highlighted, OwnClasses };
 
   void MakeClasses(const GridLayer& layer, const ShownUnit& unit);
+  void MakeScale(const std::vector<ScaleClass>& classes, const ShownUnit& unit);
   void MakeCodes(const GridLayer& layer);
   void MakeHighlighted(const GridLayer& layer);
   void MakeOwnClasses(const std::vector<CellClass>& classes);
@@ -113,6 +112,7 @@ class MapPalette {
   float deleteValue_ = 0;
   std::vector<double> borders_;  ///< Of the classes, in the stored unit: one more than classes.
   double perClass_ = 0;          ///< Classes for one stored unit.
+  std::vector<float> upTo_;      ///< The largest values of the classes of a scale with borders of its own.
   std::vector<unsigned> codes_;
   std::vector<std::uint8_t> colorOfCode_;  ///< By the code, of small codes.
   float highlighted_ = 0;
