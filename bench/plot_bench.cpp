@@ -5,7 +5,6 @@
 // toolkit's own drawing of a picture of as many pixels, turned and shrunk alike.
 #include <QApplication>
 #include <QPainter>
-#include <QSlider>
 #include <QTemporaryDir>
 #include <QTimer>
 #include <algorithm>
@@ -25,6 +24,7 @@
 #include "platform/item_types.h"
 #include "shell/charts/series_plot.h"
 #include "shell/editors/data_viewer.h"
+#include "shell/editors/time_player.h"
 #include "shell/maps/map_canvas.h"
 #include "shell/maps/map_view.h"
 #include "shell/widgets/qt_text.h"
@@ -213,25 +213,41 @@ void MeasureInterpolation() {
   Report("  from cancelling to the end of the work", Milliseconds([&] { computed->Run(cancelled); }), 50, "ms");
 }
 
-void MeasureViewer() {
-  constexpr int kCells = 1000, kSteps = 100;
-  const QTemporaryDir folder;
-  const std::string path = FromQt(folder.filePath("heads.nds2"));
+/// A file of heads over days; the first cell of a day has its number.
+std::string WriteHeads(const std::string& path, int cells, int steps) {
   NewDataFile content;
-  content.geometry.nx = content.geometry.ny = kCells;
+  content.geometry.nx = content.geometry.ny = cells;
   content.geometry.cellSize = 50;
   content.items = {{"Head", quantity::kElevation, 1000, {}}};
   DataFileWriter writer;
   std::string error = writer.Create(path, content);
-  std::vector<float> values(static_cast<std::size_t>(kCells) * kCells);
-  for (int step = 0; step < kSteps && error.empty(); ++step) {
+  std::vector<float> values(static_cast<std::size_t>(cells) * static_cast<std::size_t>(cells));
+  for (int step = 0; step < steps && error.empty(); ++step) {
     for (std::size_t i = 0; i < values.size(); ++i)
       values[i] = static_cast<float>(i % 977 + static_cast<std::size_t>(step));
     error = writer.AddStep(CYbDateTime(2000, 1, 1) + CYbDateTimeSpan{86400 * step});
     if (error.empty()) error = writer.Put(1, values);
   }
-  if (error.empty()) error = writer.Finish().error;
-  if (!error.empty()) return fmt::print("no file: {}\n", error);
+  return error.empty() ? writer.Finish().error : error;
+}
+
+/// Waits until the map shows a step.
+void WaitForStep(DataViewer& viewer, int step) {
+  const auto& canvas = *viewer.findChild<MapCanvas*>();
+  WatchEvents(
+      [&] {
+        const auto& grids = canvas.Content().grids;
+        return !grids.empty() &&
+               std::abs(grids.front().grid->Values().front() - static_cast<float>(step % 977)) < 100 &&
+               !canvas.IsPreparing() && !viewer.findChild<MapView*>()->IsBusy();
+      },
+      [](double) {});
+}
+
+void MeasureViewer() {
+  const QTemporaryDir folder;
+  const std::string path = FromQt(folder.filePath("heads.nds2"));
+  if (const std::string error = WriteHeads(path, 1000, 100); !error.empty()) return fmt::print("no file: {}\n", error);
   NobodyToAsk host;
   const DisplayUnits units;
   std::unique_ptr<DataViewer> viewer;
@@ -241,18 +257,47 @@ void MeasureViewer() {
     viewer->show();
     viewer->grab();
   });
-  const auto wait = [&] {
-    WatchEvents([&] { return !viewer->findChild<MapView*>()->IsBusy(); }, [](double) {});
-    viewer->grab();
-  };
   Report("a data file of 400 MB: until its tab answers", answer, 200, "ms");
-  Report("  until its map", answer + Milliseconds(wait), 500, "ms");
-  auto* steps = viewer->findChild<QSlider*>();
-  Report("  another time step, until its map", MedianOf([&] {
-           steps->setValue(steps->value() + 1);
-           wait();
-         }),
-         100, "ms");
+  Report("  until its map", answer + Milliseconds([&] { WaitForStep(*viewer, 0); }), 500, "ms");
+}
+
+/// Steps are played as fast as they are read, and one that was read ahead is shown.
+void MeasurePlaying(int cells, int steps, double wanted) {
+  const QTemporaryDir folder;
+  const std::string path = FromQt(folder.filePath("heads.nds2"));
+  if (const std::string error = WriteHeads(path, cells, steps); !error.empty())
+    return fmt::print("no file: {}\n", error);
+  NobodyToAsk host;
+  const DisplayUnits units;
+  DataViewer viewer(path, host, units);
+  viewer.resize(kSize);
+  viewer.show();
+  WaitForStep(viewer, 0);
+  auto& player = *viewer.findChild<TimePlayer*>();
+  auto& canvas = *viewer.findChild<MapCanvas*>();
+  std::vector<double> shown;
+  int played = 0;
+  QObject::connect(&player, &TimePlayer::StepChosen, &viewer, [&] {
+    ++played;
+    shown.push_back(Milliseconds([&] { canvas.repaint(); }));
+  });
+  player.SetSpeed(1000);
+  player.SetLooping(true);
+  constexpr double kPlayed = 3000;
+  player.Play();
+  const double time = Milliseconds([&] {
+    WatchEvents(
+        [&, start = std::chrono::steady_clock::now()] {
+          return std::chrono::steady_clock::now() - start > std::chrono::milliseconds(static_cast<int>(kPlayed));
+        },
+        [](double) {});
+  });
+  player.Pause();
+  const std::string what = fmt::format("{0} x {0} cells", cells);
+  if (shown.empty()) return fmt::print("WRONG: no step of {} was played\n", what);
+  Report(what + ": a step that was read ahead is drawn", Median(shown), 1000 / wanted, "ms");
+  Report(fmt::format("  played, {:.0f} steps a second: one step", 1000 * played / time), time / played, 1000 / wanted,
+         "ms");
 }
 
 void MeasureSeries() {
@@ -330,6 +375,8 @@ void Measure() {
   MeasurePeer();
   MeasureInterpolation();
   MeasureViewer();
+  MeasurePlaying(1000, 100, 60);
+  MeasurePlaying(5000, 12, 20);
   MeasureSeries();
   MeasurePanels();
 }

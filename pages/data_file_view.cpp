@@ -42,6 +42,11 @@ bool DataFileView::Reopen(bool always) {
   return true;
 }
 
+void DataFileView::OpenOther(const std::string& path) {
+  path_ = path;
+  Reopen(true);
+}
+
 std::string DataFileView::ItemDetail(int number) const {
   const DataItem& item = Items()[static_cast<std::size_t>(number - 1)];
   const FileGeometry& g = item.geometry;
@@ -109,37 +114,6 @@ std::string DataFileView::FindDate(const std::string& typed, std::size_t& step) 
   return {};
 }
 
-MapContent DataFileView::Map() {
-  MapContent map;
-  if (!problem_.empty() || !IsGrid()) {
-    map.message = problem_.empty() ? "It is no grid: its values stand in the table." : problem_;
-    return map;
-  }
-  CTvnData2DNdsFile file(nullptr);
-  file.SetFileUsed(0);  // any grid is shown, also one of several layers
-  file.File = FileName(path_, {});
-  file.Items = {chosen_.front()};
-  map = FileMap(file, slice_);
-  if (map.grids.empty()) return map;
-  if (putOver_) putOver_(map);
-  grid_ = map.grids.front().grid;
-  map.grids.front().isCodes = Item().itemType == quantity::kCode;
-  if (Steps() > 1 || Layers() > 1) map.grids.front().range = WholeRange();
-  return map;
-}
-
-std::optional<std::pair<float, float>> DataFileView::WholeRange() const {
-  const auto stored = file_.StoredStatistics(chosen_.front());
-  if (!stored || !(stored->smallest <= stored->largest)) return std::nullopt;
-  UnitConversion toBase;
-  if (const ItemType* type = FindItemType(Item().itemType); type && type->code != quantity::kUndefined) {
-    const auto conversion = Item().scale ? ConversionBetween(*Item().scale, BaseUnit(*type).scale) : std::nullopt;
-    if (!conversion) return std::nullopt;
-    toBase = *conversion;
-  }
-  return std::pair(static_cast<float>(toBase(stored->smallest)), static_cast<float>(toBase(stored->largest)));
-}
-
 SeriesContent DataFileView::Chart() const {
   SeriesContent chart;
   chart.message = problem_;
@@ -172,17 +146,25 @@ std::size_t DataFileView::ColumnCount() const {
 }
 
 FieldUnit DataFileView::UnitOf(const DataItem& item) const {
+  // A difference of degrees is of no quantity.
+  if (IsGrid() && grid_ && grid_->ItemType() != item.itemType) {
+    const Unit* unit = FindUnit(grid_->ItemUnit());
+    return {unit ? std::string(unit->abbreviation) : std::string(), 0, nullptr};
+  }
   // Grids are read in the base unit of their quantity; series and lines stay as they are.
   const bool isConverted = item.dimensions >= 2 && item.itemType != quantity::kUndefined && FindItemType(item.itemType);
   return isConverted ? FieldUnit{{}, item.itemType, units_} : FieldUnit{ShortUnitOf(item), 0, nullptr};
 }
 
 std::string DataFileView::RowHead(std::size_t row) const {
+  // A table that is still shown asks on when its file has gone.
+  if (row >= RowCount()) return {};
   if (IsSeries()) return StepText(firstRow_ + row);
   return fmt::format("{}", IsGrid() ? RowCount() - 1 - row : row + 1);
 }
 
 std::string DataFileView::ColumnHead(std::size_t column) const {
+  if (column >= ColumnCount()) return {};
   if (IsGrid()) return fmt::format("{}", column);
   const DataItem& item = IsSeries() ? Items()[static_cast<std::size_t>(series_[column] - 1)] : Item();
   const std::string unit = UnitOf(item).Text();
@@ -211,6 +193,7 @@ float DataFileView::ValueAt(int item, std::size_t step) {
 }
 
 std::string DataFileView::Cell(std::size_t row, std::size_t column) {
+  if (row >= RowCount() || column >= ColumnCount()) return {};
   if (IsSeries()) {
     const int number = series_[column];
     return Shown(ValueAt(number, firstRow_ + row), UnitOf(Items()[static_cast<std::size_t>(number - 1)]));

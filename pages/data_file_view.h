@@ -6,10 +6,8 @@
 
 #include <cstddef>
 #include <deque>
-#include <functional>
 #include <map>
 #include <memory>
-#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -37,6 +35,8 @@ class DataFileView {
   /// Opens the file anew if it is another one on the disk than it was, or always. What was chosen stays chosen where it
   /// is still there. True when all must be shown anew.
   bool Reopen(bool always = false);
+  /// Opens another file in the place of this one.
+  void OpenOther(const std::string& path);
 
   const std::vector<DataItem>& Items() const { return file_.Items(); }
   /// "mm/day, 365 values"
@@ -62,9 +62,12 @@ class DataFileView {
   /// The step whose stamp is nearest to a date that a user typed, or what was expected.
   std::string FindDate(const std::string& typed, std::size_t& step) const;
 
-  /// What is put over each map, such as where a model lies.
-  void PutOverMaps(std::function<void(MapContent& map)> put) { putOver_ = std::move(put); }
-  MapContent Map();
+  bool HasDates() const { return file_.Time().hasDates; }
+  CYbDateTime StampOfStep(std::size_t step) const { return file_.Time().Stamp(step); }
+  /// The file tells the smallest and the largest value of the chosen item.
+  bool HasStoredRange() const { return file_.StoredStatistics(chosen_.front()).has_value(); }
+  /// The values that the table of a grid has, those of the chosen step and layer or a difference; null for none yet.
+  void ShowGrid(std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid) { grid_ = std::move(grid); }
   SeriesContent Chart() const;
 
   // ---- The table
@@ -99,14 +102,11 @@ class DataFileView {
     std::vector<float> values;
   };
 
-  /// Of all steps and layers of the grid, where the file tells.
-  std::optional<std::pair<float, float>> WholeRange() const;
   FieldUnit UnitOf(const DataItem& item) const;
   float ValueAt(int item, std::size_t step);
   std::string Shown(float value, const FieldUnit& unit) const;
 
   std::string path_;
-  std::function<void(MapContent& map)> putOver_;
   const DisplayUnits* units_;
   FileStamp stamp_;
   DataFile file_;

@@ -48,7 +48,7 @@ constexpr int kToldFor = 8000;  ///< Milliseconds for which the status line tell
 
 bool IsDataFile(const QString& path) {
   const QString suffix = QFileInfo(path).suffix().toLower();
-  return suffix.startsWith("nds") || QStringList{"nc", "tif", "tiff", "asc"}.contains(suffix);
+  return suffix.startsWith("nds") || QStringList{"nc", "tif", "tiff", "asc", "rev"}.contains(suffix);
 }
 
 /// Lines of numbers, which some readers of grids would take as well.

@@ -6,18 +6,29 @@
 #include <QComboBox>
 #include <QFileInfo>
 #include <QHBoxLayout>
+#include <QKeyEvent>
 #include <QLabel>
 #include <QLineEdit>
 #include <QListWidget>
+#include <QPainter>
+#include <QProgressDialog>
 #include <QSignalBlocker>
-#include <QSlider>
 #include <QSplitter>
 #include <QStackedWidget>
-#include <QToolButton>
+#include <QTabBar>
+#include <QTabWidget>
 #include <QVBoxLayout>
+#include <initializer_list>
+
+#include <fmt/format.h>
 
 #include "shell/charts/series_plot.h"
+#include "shell/editors/animation.h"
 #include "shell/editors/data_table.h"
+#include "shell/editors/frames_ahead.h"
+#include "shell/editors/result_tools.h"
+#include "shell/editors/time_player.h"
+#include "shell/maps/map_canvas.h"
 #include "shell/maps/map_view.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/row_delegate.h"
@@ -29,15 +40,28 @@ namespace {
 
 constexpr int kListWidth = 230, kPlotHeight = 430, kTableHeight = 260;
 constexpr int kDateWidth = 150;
+constexpr int kRest = 150;           ///< Milliseconds after which a step is no longer one that passes.
 constexpr int kDiskInterval = 2000;  ///< Milliseconds between looks at the file on disk.
 
 }  // namespace
 
 DataViewer::DataViewer(const std::string& path, Host& host, const DisplayUnits& units)
-    : file_(path, &units), further_([] { return std::vector<SeriesOffer>(); }), units_(units), shownUnits_(units) {
+    : path_(path),
+      isSetup_(IsNamedAsViewedSetup(path)),
+      file_(isSetup_ ? std::string() : path, &units),
+      host_(host),
+      result_(file_, &units, host),
+      further_([] { return std::vector<SeriesOffer>(); }),
+      units_(units),
+      shownUnits_(units) {
   map_ = new MapView(host);
   chart_ = new SeriesPlot(host);
   table_ = new DataTable(file_);
+  cells_ = new SeriesPlot(host);
+  profile_ = new SeriesPlot(host);
+  player_ = new TimePlayer;
+  tools_ = new ResultTools(result_, file_, host);
+  frames_ = std::make_unique<FramesAhead>(result_, units_);
   whole_ = new QStackedWidget;
   whole_->addWidget(BuildBody());
   problem_ = new QLabel;
@@ -49,7 +73,13 @@ DataViewer::DataViewer(const std::string& path, Host& host, const DisplayUnits& 
   auto* all = new QVBoxLayout(this);
   all->setContentsMargins(0, 0, 0, 0);
   all->addWidget(whole_);
+  Connect();
+  disk_.start(kDiskInterval);
+  FollowTheme();
+  Reload(true);
+}
 
+void DataViewer::Connect() {
   connect(items_, &QListWidget::itemSelectionChanged, this, [this] {
     std::vector<int> numbers;
     // The one that was chosen last comes first, so that it decides what is shown.
@@ -59,33 +89,50 @@ DataViewer::DataViewer(const std::string& path, Host& host, const DisplayUnits& 
     file_.Choose(std::move(numbers));
     ShowItem();
   });
-  connect(steps_, &QSlider::valueChanged, this, [this](int step) {
-    file_.ChooseSlice({static_cast<std::size_t>(step), file_.Slice().layer});
+  connect(player_, &TimePlayer::StepChosen, this, &DataViewer::GoToStep);
+  connect(player_, &TimePlayer::Paused, this, [this] { rest_.start(); });
+  player_->WaitFor([this](int step) {
+    if (frames_->At(static_cast<std::size_t>(step), Every())) return true;
+    frames_->Want(file_.Slice().step, Every(), 1, file_.Steps());
+    // As long as nothing can be read ahead, each step is waited for when it is shown.
+    return !result_.Colors();
+  });
+  connect(frames_.get(), &FramesAhead::Came, this, [this](std::size_t step) {
+    if (step != file_.Slice().step || !rest_.isActive()) return;
+    if (const auto ready = frames_->At(step, Every())) ShowFrame(*ready);
+  });
+  rest_.setSingleShot(true);
+  rest_.setInterval(kRest);
+  connect(&rest_, &QTimer::timeout, this, &DataViewer::ShowSlice);
+  connect(tools_, &ResultTools::Changed, this, [this] {
+    frames_->Forget();
+    tools_->Sync();
     ShowSlice();
   });
-  connect(earlier_, &QToolButton::clicked, this, [this] { steps_->setValue(steps_->value() - 1); });
-  connect(later_, &QToolButton::clicked, this, [this] { steps_->setValue(steps_->value() + 1); });
+  connect(tools_, &ResultTools::CellsChanged, this, &DataViewer::ShowSlice);
+  connect(tools_, &ResultTools::LineWanted, this, &DataViewer::AskLine);
+  connect(tools_, &ResultTools::AnimationWanted, this, &DataViewer::SaveAnimation);
+  connect(below_, &QTabWidget::currentChanged, this, &DataViewer::ShowCharts);
   connect(layers_, &QComboBox::activated, this, [this](int index) {
     // The list goes from the top, as layers lie; the file counts from the bottom.
     file_.ChooseSlice({file_.Slice().step, file_.Layers() - 1 - index});
+    frames_->Forget();
     ShowSlice();
   });
   connect(date_, &QLineEdit::returnPressed, this, &DataViewer::GoToDate);
   connect(table_, &DataTable::Told, this, &DataViewer::ShowNotes);
   connect(&disk_, &QTimer::timeout, this, [this] { Reload(false); });
   connect(&Theme::Get(), &Theme::Changed, this, &DataViewer::FollowTheme);
-  disk_.start(kDiskInterval);
-  FollowTheme();
-  Reload(true);
 }
 
 DataViewer::~DataViewer() {
   // What shows the file goes before the file does.
+  frames_.reset();
   delete whole_;
 }
 
 void DataViewer::PutOverMaps(std::function<void(MapContent& map)> put) {
-  file_.PutOverMaps(std::move(put));
+  result_.PutOverMaps(std::move(put));
   if (Problem().empty()) ShowSlice();
 }
 
@@ -101,28 +148,7 @@ QWidget* DataViewer::BuildChoices() {
   line->addWidget(layerLabel_);
   line->addWidget(layers_);
 
-  stepRow_ = new QWidget;
-  auto* steps = new QHBoxLayout(stepRow_);
-  steps->setContentsMargins(0, 0, 0, 0);
-  const auto button = [](const QString& tip) {
-    auto* made = new QToolButton;
-    made->setAutoRaise(true);
-    made->setAutoRepeat(true);
-    made->setToolTip(tip);
-    made->setAccessibleName(tip);
-    return made;
-  };
-  earlier_ = button(tr("The step before"));
-  later_ = button(tr("The next step"));
-  steps_ = new QSlider(Qt::Horizontal);
-  steps_->setAccessibleName(tr("Time step"));
-  step_ = new QLabel;
-  steps->addWidget(new QLabel(tr("Time step:")));
-  steps->addWidget(earlier_);
-  steps->addWidget(steps_, 1);
-  steps->addWidget(later_);
-  steps->addWidget(step_);
-  line->addWidget(stepRow_, 1);
+  line->addWidget(player_, 1);
   line->addStretch();
 
   date_ = new QLineEdit;
@@ -158,14 +184,20 @@ QWidget* DataViewer::BuildBody() {
 
   split_ = new QSplitter(Qt::Vertical);
   split_->setChildrenCollapsible(false);
+  below_ = new QTabWidget;
+  below_->setDocumentMode(true);
+  below_->addTab(values, tr("Values"));
+  below_->addTab(cells_, tr("At Cells"));
+  below_->addTab(profile_, tr("Along Line"));
   split_->addWidget(plots_);
-  split_->addWidget(values);
+  split_->addWidget(below_);
   split_->setStretchFactor(0, 1);
   auto* right = new QWidget;
   auto* column = new QVBoxLayout(right);
   const int margin = Theme::Get().Scaled(8);
   column->setContentsMargins(margin, margin, margin, margin);
   column->addWidget(BuildChoices());
+  column->addWidget(tools_);
   column->addWidget(split_, 1);
   auto* body = new QSplitter;
   body->setChildrenCollapsible(false);
@@ -179,23 +211,35 @@ QWidget* DataViewer::BuildBody() {
 
 void DataViewer::FollowTheme() {
   const Theme& theme = Theme::Get();
-  earlier_->setIcon(theme.Icon("back"));
-  later_->setIcon(theme.Icon("forward"));
-  const QSize size(theme.Scaled(16), theme.Scaled(16));
-  earlier_->setIconSize(size);
-  later_->setIconSize(size);
   date_->setFixedWidth(theme.Scaled(kDateWidth));
-  // What the slider tells must not move it.
-  step_->setMinimumWidth(step_->fontMetrics().horizontalAdvance("0000-00-00 00:00  (000000 of 000000)"));
   QPalette quiet = QApplication::palette();
   quiet.setColor(QPalette::WindowText, theme.QuietColor());
   problem_->setPalette(quiet);
   told_->setPalette(quiet);
 }
 
+void DataViewer::ReadSetup() {
+  setupStamp_ = StampOf(path_);
+  setupNotes_.clear();
+  ViewedSetup setup;
+  setupProblem_ = ReadViewedSetup(path_, setup).error;
+  if (!setupProblem_.empty()) return;
+  setupNotes_ = setup.notes;
+  file_.OpenOther(setup.result.path);
+  file_.Choose({setup.result.item});
+  if (file_.Problem().empty() && file_.Chosen().front() != setup.result.item)
+    setupNotes_.push_back(fmt::format("There is no item {} any more: the first one is shown.", setup.result.item));
+  file_.ChooseSlice({static_cast<std::size_t>(setup.currentStep), setup.result.layer});
+  result_.TakeSetup(setup);
+}
+
 void DataViewer::Reload(bool always) {
-  const bool isOther = file_.Reopen(always);
+  const bool isOtherSetup = isSetup_ && (always || StampOf(path_) != setupStamp_);
+  if (isOtherSetup) ReadSetup();
+  const bool isOther = file_.Reopen(always && !isSetup_) || isOtherSetup;
   if (!isOther && shownUnits_ == units_) return;
+  result_.Forget();
+  frames_->Forget();
   shownUnits_ = units_;
   whole_->setCurrentIndex(Problem().empty() ? 0 : 1);
   problem_->setText(ToQt(Problem()));
@@ -212,6 +256,7 @@ void DataViewer::Reload(bool always) {
     for (const int number : file_.Chosen()) items_->item(number - 1)->setSelected(true);
   }
   QStringList notes;
+  for (const std::string& note : setupNotes_) notes << ToQt(note);
   for (const std::string& note : file_.Notes()) notes << ToQt(note);
   ShowNotes(notes.join("\n"));
   ShowItem();
@@ -219,8 +264,8 @@ void DataViewer::Reload(bool always) {
 
 void DataViewer::ShowItem() {
   if (!Problem().empty()) {
-    map_->StopWaiting();
-    chart_->StopWaiting();
+    for (PlotFrame* plot : std::initializer_list<PlotFrame*>{map_, chart_, cells_, profile_}) plot->StopWaiting();
+    player_->Pause();
     table_->Reset();
     return;
   }
@@ -234,7 +279,17 @@ void DataViewer::ShowItem() {
   const bool hasLayers = file_.Layers() > 1;
   layerLabel_->setVisible(hasLayers);
   layers_->setVisible(hasLayers);
-  stepRow_->setVisible(!isSeries && file_.Steps() > 1);
+  const bool isGrid = file_.IsGrid(), hasSteps = !isSeries && file_.Steps() > 1;
+  player_->setVisible(hasSteps);
+  player_->SetSteps(hasSteps ? static_cast<int>(file_.Steps()) : 1,
+                    [this](int step) { return ToQt(file_.StepText(static_cast<std::size_t>(step))); });
+  tools_->setVisible(isGrid);
+  below_->tabBar()->setVisible(isGrid);
+  below_->setTabVisible(1, isGrid && hasSteps);
+  below_->setTabVisible(2, isGrid);
+  if (!isGrid) below_->setCurrentIndex(0);
+  frames_->Forget();
+  if (isGrid) tools_->Sync();
   date_->setVisible(isSeries || file_.Steps() > 1);
   table_->Reset();
   if (isSeries) {
@@ -255,28 +310,141 @@ void DataViewer::ShowSlice() {
   tableText_->setText(ToQt(file_.TableText()));
   tableText_->setVisible(!tableText_->text().isEmpty());
   if (file_.IsSeries()) return;
-  const auto step = static_cast<int>(file_.Slice().step), steps = static_cast<int>(file_.Steps());
-  {
-    const QSignalBlocker blocker(steps_);
-    steps_->setRange(0, steps - 1);
-    steps_->setValue(step);
-  }
-  earlier_->setEnabled(step > 0);
-  later_->setEnabled(step + 1 < steps);
-  step_->setText(tr("%1  (%2 of %3)").arg(ToQt(file_.StepText(file_.Slice().step))).arg(step + 1).arg(steps));
+  player_->SetStep(static_cast<int>(file_.Slice().step));
   layers_->setCurrentIndex(file_.Layers() - 1 - file_.Slice().layer);
+  ShowMap();
+  ShowCharts();
+}
+
+void DataViewer::ShowMap() {
+  rest_.stop();
   map_->ShowWhenThere(
       [this] {
-        MapContent map = file_.Map();
-        map.picked = [this](const MapPick& pick) {
-          if (!pick.cell) return;
-          const auto [row, column] = file_.TableCellOf(pick.cell->first, pick.cell->second);
-          table_->GoTo(row, column);
-        };
+        MapContent map = result_.Map();
+        map.picked = [this](const MapPick& pick) { PickCell(pick); };
+        if (asksLine_)
+          map.request = MapRequest{MapRequest::Kind::Line, "Click the points of the line; a double click ends it.",
+                                   [this](const std::vector<MapPoint>& points) {
+                                     asksLine_ = false;
+                                     result_.TakeLine(points);
+                                     below_->setCurrentWidget(profile_);
+                                     ShowSlice();
+                                   },
+                                   [this] { asksLine_ = false; }};
         if (map.awaited.empty()) table_->Refill();
         return map;
       },
       &units_);
+}
+
+void DataViewer::ShowCharts() {
+  if (!Problem().empty() || !file_.IsGrid()) return;
+  if (below_->currentWidget() == cells_) cells_->ShowWhenThere([this] { return result_.CellSeries(); });
+  if (below_->currentWidget() == profile_) profile_->ShowWhenThere([this] { return result_.Profile(); });
+}
+
+int DataViewer::Every() const {
+  const DataItem& item = file_.Item();
+  return item.geometry.IsPlaced() ? result_.EveryFor(map_->Canvas().Window().metresPerPixel / item.geometry.cellSize)
+                                  : 1;
+}
+
+void DataViewer::GoToStep(int step) {
+  const auto before = static_cast<int>(file_.Slice().step);
+  if (step != before) direction_ = step > before || player_->IsPlaying() ? 1 : -1;
+  file_.ChooseSlice({static_cast<std::size_t>(step), file_.Slice().layer});
+  if (!file_.IsGrid()) return ShowSlice();
+  // Reading goes on from here, also while the user drags.
+  rest_.start();
+  const int every = Every();
+  frames_->Want(static_cast<std::size_t>(step), every, direction_, file_.Steps());
+  if (const auto ready = frames_->At(static_cast<std::size_t>(step), every)) ShowFrame(*ready);
+}
+
+void DataViewer::ShowFrame(const ReadyFrame& ready) {
+  if (!ready.frame) return ShowMap();
+  map_->Canvas().ShowFrame(ready.layer, ready.picture, result_.ArrowsOf(*ready.frame), ready.every > 1);
+  if (ready.every == 1) file_.ShowGrid(ready.frame->grid);
+  if (below_->currentWidget() == profile_) profile_->Show(result_.Profile(*ready.frame));
+}
+
+void DataViewer::AskLine() {
+  player_->Pause();
+  asksLine_ = true;
+  ShowMap();
+}
+
+void DataViewer::PickCell(const MapPick& pick) {
+  if (!pick.cell) return;
+  const auto [row, column] = file_.TableCellOf(pick.cell->first, pick.cell->second);
+  table_->GoTo(row, column);
+  if (file_.Steps() < 2 || !file_.HasDates()) return;
+  result_.PickCell(pick.cell->first, pick.cell->second);
+  below_->setCurrentWidget(cells_);
+  ShowSlice();
+}
+
+QImage DataViewer::AnimationPicture(std::size_t step, std::string& problem) {
+  const auto computed = result_.Frame(step);
+  computed->Run();
+  const std::optional<GridLayer> colors = result_.Colors();
+  if (!computed->Result() || !colors) {
+    problem = computed->Result() ? "The colours of the map are not known yet." : computed->Problem();
+    return {};
+  }
+  GridLayer layer = *colors;
+  layer.grid = computed->Result()->grid;
+  const std::atomic<bool> isGivenUp{false};
+  map_->Canvas().ShowFrame(layer, GridPicture::Make(layer, units_, isGivenUp), result_.ArrowsOf(*computed->Result()),
+                           false);
+  const QImage map = map_->Canvas().Picture(1);
+  // The time stands above the map.
+  const QFontMetrics metrics(font());
+  const int head = 2 * metrics.height();
+  QImage picture(map.width(), map.height() + head, QImage::Format_RGB32);
+  picture.fill(palette().color(QPalette::Base));
+  QPainter painter(&picture);
+  painter.drawImage(0, head, map);
+  painter.setFont(font());
+  painter.setPen(palette().color(QPalette::Text));
+  QString text = ToQt(file_.Item().name) + "   " + ToQt(file_.StepText(step));
+  if (result_.IsDifference()) text += "   " + ToQt(result_.DifferenceText());
+  painter.drawText(QRect(metrics.height(), 0, map.width(), head), Qt::AlignVCenter, text);
+  return picture;
+}
+
+void DataViewer::SaveAnimation() {
+  player_->Pause();
+  const auto path = host_.AskFileToSave({FromQt(tr("Save Animation")), "PNG picture (*.png)|*.png||", "png", {}});
+  if (!path) return;
+  if (FileExists(PictureFile(*path, 1)) &&
+      host_.Ask(FromQt(tr("Pictures of that name are there already, %1 and more. Replace them?")
+                           .arg(ToQt(PictureFile(*path, 1)))),
+                Host::Icon::Question, Host::Buttons::YesNo) != Host::Answer::Yes)
+    return;
+  const auto steps = static_cast<int>(file_.Steps());
+  QProgressDialog progress(tr("Drawing %1 pictures").arg(steps), tr("Stop"), 0, steps, this);
+  progress.setWindowModality(Qt::WindowModal);
+  const std::string problem = tervane::SaveAnimation(
+      *path, static_cast<std::size_t>(steps),
+      [this](std::size_t number, std::string& reason) { return AnimationPicture(number - 1, reason); },
+      [&progress](std::size_t done) {
+        // The dialog lets the window's events run, so that it can be stopped.
+        progress.setValue(static_cast<int>(done));
+        return !progress.wasCanceled();
+      });
+  ShowSlice();
+  if (problem == kCancelled)
+    ShowNotes(tr("Stopped: no picture was written."));
+  else if (!problem.empty())
+    host_.ShowMessage(problem, Host::Icon::Error);
+  else
+    ShowNotes(tr("%1 pictures were written: %2 and those that follow.").arg(steps).arg(ToQt(PictureFile(*path, 1))));
+}
+
+void DataViewer::keyPressEvent(QKeyEvent* event) {
+  if (event->key() == Qt::Key_Space && player_->isVisible()) return player_->PlayOrPause();
+  QWidget::keyPressEvent(event);
 }
 
 void DataViewer::GoToDate() {
@@ -286,7 +454,10 @@ void DataViewer::GoToDate() {
     return;
   }
   ShowNotes({});
-  if (!file_.IsSeries()) return steps_->setValue(static_cast<int>(step));
+  if (!file_.IsSeries()) {
+    file_.ChooseSlice({step, file_.Slice().layer});
+    return ShowSlice();
+  }
   bool isMoved = false;
   const std::size_t row = file_.ShowRowOf(step, isMoved);
   if (isMoved) table_->Reset();

@@ -53,11 +53,6 @@ void WriteGrid(const std::string& path) {
   ASSERT_EQ(writer.Finish().error, "");
 }
 
-/// The map with all that is read for it.
-MapContent MapOf(DataFileView& view) {
-  return Finished<MapContent>([&view] { return view.Map(); });
-}
-
 TEST(DataFileView, ShowsSeriesAsRowsOfTimesWithUnitsInTheHeads) {
   const TempFolder folder;
   WriteSeries(folder.File("a.nds0"), 0.5F);
@@ -109,10 +104,9 @@ TEST(DataFileView, ShowsTheChosenStepAndLayerOfAGridTheNorthFirst) {
   view.ChooseSlice({3, 1});
   EXPECT_EQ(view.StepText(3), "2000-01-04 00:00");
   EXPECT_EQ(view.Cell(0, 0), "");  // not read yet
-  const MapContent map = MapOf(view);
-  ASSERT_EQ(map.grids.size(), 1U);
-  EXPECT_EQ(map.grids.front().grid->Value(1, 2), 3109);
-  EXPECT_EQ(map.grids.front().range, std::pair(0.0F, 4111.0F));
+  const auto grid = std::make_shared<CTvn2DOrthoRotatedGridData>();
+  ASSERT_EQ(ReadGridData(view.Path(), 1, *grid, {}, view.Slice()).error, "");
+  view.ShowGrid(grid);
   EXPECT_EQ(view.CellsAsText(0, 2, 0, 3, false),
             "3108\t3109\t3110\t3111\n3104\t3105\t3106\t3107\n3100\t3101\t3102\t3103\n");
   EXPECT_EQ(view.RowHead(0), "2");
@@ -140,6 +134,7 @@ TEST(DataFileView, FollowsTheFileOnTheDisk) {
   EXPECT_TRUE(view.Reopen());
   EXPECT_THAT(view.Problem(), HasSubstr("not there any more"));
   EXPECT_EQ(view.RowCount(), 0U);
+  EXPECT_EQ(view.RowHead(1) + view.ColumnHead(0) + view.Cell(1, 0), "") << "a table asks on while it is shown";
   folder.Write("a.nds0", "no data file");
   EXPECT_TRUE(view.Reopen());
   EXPECT_THAT(view.Problem(), HasSubstr("a.nds0"));
