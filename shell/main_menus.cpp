@@ -32,6 +32,7 @@
 #include "shell/page/table_view.h"
 #include "shell/program.h"
 #include "shell/run/document_run.h"
+#include "shell/run_comparison_view.h"
 #include "shell/template_tab.h"
 #include "shell/welcome_page.h"
 #include "shell/widgets/qt_text.h"
@@ -63,6 +64,7 @@ std::pair<QString, QString> TitleAndPath(const QWidget* tab) {
   if (const auto* viewer = qobject_cast<const DataViewer*>(tab)) return {viewer->Title(), ToQt(viewer->Path())};
   if (const auto* shown = qobject_cast<const TemplateTab*>(tab)) return {shown->Title(), ToQt(shown->Path())};
   if (const auto* comparison = qobject_cast<const CompareView*>(tab)) return {comparison->Title(), comparison->Path()};
+  if (const auto* runs = qobject_cast<const RunComparisonView*>(tab)) return {runs->Title(), {}};
   return {};
 }
 

@@ -21,9 +21,12 @@
 #include <QToolBar>
 
 #include "document/edit_session.h"
+#include "execution/run_passport.h"
 #include "libraries/library_kinds.h"
 #include "pages/parts/plot_content.h"
+#include "pages/run_comparison.h"
 #include "platform/files.h"
+#include "platform/paths.h"
 #include "platform/text_fields.h"
 #include "shell/changes_dialog.h"
 #include "shell/compare_view.h"
@@ -32,6 +35,7 @@
 #include "shell/library_tab.h"
 #include "shell/program.h"
 #include "shell/run/document_run.h"
+#include "shell/run_comparison_view.h"
 #include "shell/template_tab.h"
 #include "shell/welcome_page.h"
 #include "shell/widgets/qt_text.h"
@@ -148,6 +152,10 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
   connect(frame, &DocumentFrame::Told, this, [this](const QString& text) { statusBar()->showMessage(text, kToldFor); });
   connect(frame, &DocumentFrame::DataFileWanted, this, [this, frame](const QString& path) {
+    if (IsNamedAsPassport(FromQt(path))) {
+      CompareRunWith(*frame, FromQt(path));
+      return;
+    }
     const bool isSetup = path.endsWith(".tvd", Qt::CaseInsensitive);
     if (!(isSetup ? OpenDocument(path) : ShowDataFile(path)) || !Viewer()) return;
     Viewer()->PutOverMaps([setup = QPointer(frame)](MapContent& map) {
@@ -305,6 +313,8 @@ bool MainWindow::ShowDataFile(const QString& path) {
 }
 
 bool MainWindow::OpenFile(const QString& path) {
+  if (Frame() && IsNamedAsPassport(FromQt(path)))
+    return CompareRunWith(*Frame(), FromQt(QFileInfo(path).absoluteFilePath()));
   return IsDataFile(path) || KindOf(path) || IsNamedAsTemplate(FromQt(path)) ? ShowDataFile(path) : OpenDocument(path);
 }
 
@@ -442,6 +452,31 @@ bool MainWindow::CompareWith(DocumentFrame& frame, const std::string& path) {
   });
   // It shows the session of the frame.
   connect(&frame, &QObject::destroyed, view, [view] { delete view; });
+  tabs_->setCurrentIndex(tabs_->addTab(view, view->Title()));
+  SyncCommands();
+  return true;
+}
+
+bool MainWindow::CompareRunWith(DocumentFrame& frame, const std::string& passport) {
+  const CFlowModelDoc& document = frame.Session().Document();
+  const ComparedRun own =
+      ComparedRunOf(PassportFilesOf(ResolvedPath(document.getResultFolder(), {}), document.PathName()).passport);
+  RunComparison runs;
+  if (const FileResult read = ReadRuns(own, ComparedRunOf(passport), runs); !read.Ok()) {
+    host_.ShowMessage(read.error, Host::Icon::Error);
+    return false;
+  }
+  const auto compared = std::make_shared<Computed<RunComparison>>(
+      "Comparing two runs", [runs, units = program_.Units()](RunComparison& comparison, ProgressPart progress) {
+        comparison = runs;
+        return CompareFigures(units, comparison, progress);
+      });
+  if (!host_.Compute(compared)) return false;
+  if (!compared->Result()) {
+    host_.ShowMessage(compared->Problem(), Host::Icon::Error);
+    return false;
+  }
+  auto* view = new RunComparisonView(*compared->Result());
   tabs_->setCurrentIndex(tabs_->addTab(view, view->Title()));
   SyncCommands();
   return true;

@@ -48,6 +48,8 @@ class MainWindow : public QMainWindow {
   void Compare(DocumentFrame& frame);
   /// The same with the setup of a file; false, with a message, where it cannot be read.
   bool CompareWith(DocumentFrame& frame, const std::string& path);
+  /// Shows the latest run of a document beside the one of a passport; false, with a message, where one cannot be read.
+  bool CompareRunWith(DocumentFrame& frame, const std::string& passport);
   bool ShowDataFile(const QString& path);
   /// Opens a library of named entries in a tab of its own, or shows the one in which it is open.
   bool OpenLibrary(const LibraryKind& kind, const QString& path);

@@ -19,6 +19,7 @@
 #include "forms/plots.h"
 #include "pages/parts/file_controls.h"
 #include "pages/parts/further_series.h"
+#include "pages/parts/passport_notice.h"
 #include "pages/parts/plot_content.h"
 #include "pages/parts/section_tool.h"
 #include "platform/item_types.h"
@@ -56,7 +57,8 @@ CYbDateTime ParseListedDate(std::string_view text) {
 int ItemOf(const CPreprocessedDataEntity& n) { return n.GetNumber("ItemNo"); }
 
 /// Where the report lies, and what was read of it.
-void DescribeReport(PageForm& form, CProcDataKvf& n) {
+void DescribeReport(PageForm& form, CProcDataKvf& n, CYbSEDlgBase& page) {
+  DescribePassport(form, page);
   const auto manager = [&n] { return n.Manager(); };
   form.ReadOnlyText("Report:", [manager] { return manager() ? manager()->Path() : std::string(); });
   form.Notice([manager] {
@@ -67,8 +69,9 @@ void DescribeReport(PageForm& form, CProcDataKvf& n) {
 /// A page without content, which has pages below it.
 void DescribeNothing(PageForm& /*form*/, CPreprocessedDataEntity& /*n*/) {}
 
-/// The name of a page's file; of a line nothing else is shown.
-void DescribeFile(PageForm& form, CPreprocessedDataEntity& n) {
+/// The name of a page's file; of a line nothing else is shown. What is older than its inputs is told.
+void DescribeFile(PageForm& form, CPreprocessedDataEntity& n, CYbSEDlgBase& page) {
+  DescribeStale(form, page);
   form.ReadOnlyText("Filename:", [&n] { return n.GetFile(); });
 }
 
@@ -109,7 +112,7 @@ SeriesContent SeriesChart(const CPreprocessedDataEntity& n) {
 
 /// A time series with the simulation period.
 void DescribeSeries(PageForm& form, CPreprocessedDataEntity& n, CYbSEDlgBase& page) {
-  DescribeFile(form, n);
+  DescribeFile(form, n, page);
   form.Button("Edit...",
               [&n, &page] {
                 if (const std::string file = n.GetFile(); !file.empty() && page.Context().openDataFile)
@@ -162,7 +165,7 @@ class CPreprocessedNDS2_PLOT : public PageOf<CPreprocessedDataEntity> {
 };
 
 void CPreprocessedNDS2_PLOT::Describe(PageForm& form) {
-  DescribeFile(form, Node());
+  DescribeFile(form, Node(), *this);
   EditGridButton(form, Node(), *this);
   form.Notice([this] { return riverProblem_; });
   form.Map([this] { return Map(); });
@@ -232,7 +235,7 @@ class CPreprocessedNDS3_PLOTDlg : public PageOf<CPreprocessedDataEntity> {
 };
 
 void CPreprocessedNDS3_PLOTDlg::Describe(PageForm& form) {
-  DescribeFile(form, Node());
+  DescribeFile(form, Node(), *this);
   form.Choice(
           "Layer:", [this] { return selection_; }, [this](int layer) { selection_ = layer; },
           [this] {
@@ -314,13 +317,13 @@ void DescribeText(PageForm& form, CPreprocessedDataEntity& n) {
   form.TextView("", [&n] { return Replaced(Replaced(n.GetValue("Text"), "\\n", "\r\n"), "\\r", "\r"); });
 }
 
-void DescribeTextFile(PageForm& form, CPreprocessedDataEntity& n) {
-  DescribeFile(form, n);
+void DescribeTextFile(PageForm& form, CPreprocessedDataEntity& n, CYbSEDlgBase& page) {
+  DescribeFile(form, n, page);
   form.TextFile([&n] { return n.GetFile(); });
 }
 
-void DescribeShapes(PageForm& form, CPreprocessedDataEntity& n) {
-  DescribeFile(form, n);
+void DescribeShapes(PageForm& form, CPreprocessedDataEntity& n, CYbSEDlgBase& page) {
+  DescribeFile(form, n, page);
   form.Map([&n] {
     CData2DShpFile file(nullptr);
     file.File = FileName(n.GetFile(), {});

@@ -32,6 +32,13 @@ std::string ListOf(const std::vector<InputChange>& changes, const std::string& s
   return list;
 }
 
+/// Empty where nothing has. The page waits for no file to be read; the command line holds contents against each other.
+std::string ChangesSince(const RunPassport& passport) {
+  const std::vector<InputChange> changes = ChangedInputs(passport, true);
+  return changes.empty() ? std::string()
+                         : fmt::format("Written anew or gone since then: {}.", ListOf(changes, passport.setup));
+}
+
 /// Empty where nothing is known of the run.
 std::string NoticeOf(const CYbSEDlgBase& page) {
   if (page.Context().document.PathName().empty()) return {};
@@ -40,10 +47,23 @@ std::string NoticeOf(const CYbSEDlgBase& page) {
   if (!passport) return problem;
   std::string text = fmt::format("Of the run that {} began on {}, {} UTC. {}", passport->user, passport->host,
                                  passport->begun, passport->outcome);
-  // The page waits for no file to be read; the command line holds contents against each other.
-  const std::vector<InputChange> changes = ChangedInputs(*passport, true);
-  if (!changes.empty()) text += fmt::format("\nWritten anew or gone since then: {}.", ListOf(changes, passport->setup));
+  if (const std::string changes = ChangesSince(*passport); !changes.empty()) text += "\n" + changes;
   return text;
+}
+
+/// The same of the changes alone.
+std::string StaleNoticeOf(const CYbSEDlgBase& page) {
+  if (page.Context().document.PathName().empty()) return {};
+  std::string problem;
+  const std::optional<RunPassport> passport = ReadPassport(FilesOf(page).passport, problem);
+  const std::string changes = passport ? ChangesSince(*passport) : std::string();
+  return changes.empty() ? std::string() : fmt::format("This was made on {} UTC. {}", passport->begun, changes);
+}
+
+Condition HasPassport(const CYbSEDlgBase& page) {
+  return Condition::Sentence("A run has left its passport", [&page](const CYbSEKvfBase&) {
+    return !page.Context().document.PathName().empty() && FileExists(FilesOf(page).passport);
+  });
 }
 
 }  // namespace
@@ -59,9 +79,22 @@ void DescribePassport(PageForm& form, const CYbSEDlgBase& page) {
                   page.Context().openDataFile(setup);
               })
       .ToolTip("Opens a copy of the setup as it was when the run began")
-      .ShownWhen(Condition::Sentence("A run has left its passport", [&page](const CYbSEKvfBase&) {
-        return !page.Context().document.PathName().empty() && FileExists(FilesOf(page).passport);
-      }));
+      .ShownWhen(HasPassport(page));
+  form.Button(
+          "Compare With Another Run...",
+          [&page] {
+            const auto passport = page.Context().host.AskFileToOpen(
+                {"Compare With Another Run", "Passports of runs (*_Passport.kvf)|*_Passport.kvf|All Files (*.*)|*.*||",
+                 "kvf", FilesOf(page).passport});
+            if (passport && page.Context().openDataFile) page.Context().openDataFile(*passport);
+          })
+      .ToolTip("Shows what differs between the setups of two runs, and how well each agrees with what was observed")
+      .ShownWhen(HasPassport(page))
+      .Beside();
+}
+
+void DescribeStale(PageForm& form, const CYbSEDlgBase& page) {
+  form.Notice([&page] { return StaleNoticeOf(page); });
 }
 
 }  // namespace tervane
