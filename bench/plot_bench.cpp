@@ -5,6 +5,7 @@
 // toolkit's own drawing of a picture of as many pixels, turned and shrunk alike.
 #include <QApplication>
 #include <QPainter>
+#include <QScrollBar>
 #include <QTemporaryDir>
 #include <QTimer>
 #include <algorithm>
@@ -351,7 +352,7 @@ void MeasurePanels() {
         {.name = std::to_string(marker + 1), .time = CYbDateTime(1990, 1, 1) + CYbDateTimeSpan{86400 * 100 * marker}});
   NobodyToAsk host;
   SeriesPlot plot(host);
-  plot.resize({kSize.width(), kPanels * 100 + 54});
+  plot.resize(kSize);
   plot.show();
   QApplication::processEvents();
   Report("100 charts of 10,000 values below each other: until the first picture", Milliseconds([&] {
@@ -365,6 +366,12 @@ void MeasurePanels() {
            plot.Chart().replot();
          }),
          50, "ms");
+  auto* const bar = plot.findChild<QScrollBar*>();
+  Report("the same: scrolled by one", MedianOf([&] {
+           bar->setValue(bar->value() + 1);
+           plot.Chart().replot();
+         }),
+         16, "ms");
 }
 
 void Measure() {

@@ -50,17 +50,24 @@ bool LooksSame(const Series& a, const Series& b) {
   };
   return a.name == b.name && a.unit == b.unit && a.isStepped == b.isStepped && a.panel == b.panel &&
          a.isLogarithmic == b.isLogarithmic && a.color == b.color && a.isPoints == b.isPoints && a.times == b.times &&
-         std::ranges::equal(a.positions, b.positions, sameBits) && std::ranges::equal(a.values, b.values, sameBits);
+         std::ranges::equal(a.positions, b.positions, sameBits) && a.values.IsEqual(b.values, sameBits);
 }
 
 }  // namespace
 
-bool LooksSame(const SeriesContent& a, const SeriesContent& b) {
-  const auto sameMarker = [](const DateMarker& x, const DateMarker& y) {
+bool LooksSame(const std::vector<DateMarker>& a, const std::vector<DateMarker>& b) {
+  return std::ranges::equal(a, b, [](const DateMarker& x, const DateMarker& y) {
     return x.name == y.name && x.time == y.time && !x.moved == !y.moved && x.standsOut == y.standsOut;
-  };
+  });
+}
+
+bool LooksSame(const SeriesContent& a, const SeriesContent& b) {
+  return LooksSameButForMarkers(a, b) && LooksSame(a.markers, b.markers);
+}
+
+bool LooksSameButForMarkers(const SeriesContent& a, const SeriesContent& b) {
   return a.period == b.period && a.message == b.message && a.numbers == b.numbers && a.bars == b.bars &&
-         a.panelTitles == b.panelTitles && std::ranges::equal(a.markers, b.markers, sameMarker) &&
+         a.panelTitles == b.panelTitles &&
          std::ranges::equal(a.series, b.series, [](const Series& x, const Series& y) { return LooksSame(x, y); });
 }
 

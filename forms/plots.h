@@ -16,6 +16,7 @@
 #include "geometry/shapes.h"
 #include "platform/computation.h"
 #include "platform/dates.h"
+#include "platform/shared_values.h"
 
 namespace tervane {
 
@@ -282,8 +283,8 @@ struct DepthContent {
 struct Series {
   std::string name;
   std::string unit;
-  std::vector<CYbDateTime> times;
-  std::vector<double> values;          ///< As many; NaN for a gap.
+  SharedValues<CYbDateTime> times;
+  SharedValues<double> values;         ///< As many; NaN for a gap.
   bool isStepped = false;              ///< The value holds over the interval that ends at its time.
   std::vector<double> positions = {};  ///< In the place of times, for a chart over numbers (`SeriesContent::numbers`).
   int panel = 0;                       ///< Which of several charts below each other, from 0.
@@ -394,6 +395,9 @@ Content Finished(const std::function<Content()>& content) {
 /// a click does is not asked.
 bool LooksSame(const MapContent& a, const MapContent& b);
 bool LooksSame(const SeriesContent& a, const SeriesContent& b);
+/// The same without the dates that are marked, and these alone.
+bool LooksSameButForMarkers(const SeriesContent& a, const SeriesContent& b);
+bool LooksSame(const std::vector<DateMarker>& a, const std::vector<DateMarker>& b);
 bool LooksSame(const SectionContent& a, const SectionContent& b);
 
 /// In short what is shown, for texts: "grid 142x97, 29 shapes", "2 series, 1461 values", or the message; and what

@@ -38,11 +38,12 @@ Series Cumulated(const Series& series) {
   const std::optional<Rate> rate = RateOf(series.unit);
   if (rate) sums.unit = rate->amount;
   sums.isStepped = false;
+  std::vector<double>& values = sums.values.Change();
   double sum = 0;
   for (std::size_t i = 0; i < series.values.size() && i < series.times.size(); ++i) {
     const double value = series.values[i];
     if (!std::isnan(value)) sum += rate ? value * SecondsOf(series, i) / rate->seconds : value;
-    sums.values[i] = sum;
+    values[i] = sum;
   }
   return sums;
 }
@@ -53,8 +54,8 @@ CYbDateTime NextMonth(const CYbDateTime& time) {
 
 Series Monthly(const Series& series) {
   Series months = series;
-  months.times.clear();
-  months.values.clear();
+  months.times = {};
+  months.values = {};
   const bool isAmount = series.isStepped && !RateOf(series.unit);
   double sum = 0;
   std::size_t count = 0;

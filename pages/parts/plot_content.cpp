@@ -92,6 +92,8 @@ FileResult ReadSeries(const std::string& path, int number, FileSeries& series, P
   series.itemType = item.itemType;
   series.scale = item.scale;
   series.isStepped = item.valueType == ValueType::StepAccumulated || item.valueType == ValueType::MeanStep;
+  series.times.Change().reserve(values.size());
+  series.values.Change().reserve(values.size());
   for (std::size_t step = 0; step < values.size(); ++step) {
     series.times.push_back(file.Time().Stamp(step));
     series.values.push_back(values[step] == kDeleteValue ? std::numeric_limits<double>::quiet_NaN()
@@ -257,8 +259,11 @@ Series InUserUnit(const FileSeries& series, const DisplayUnits* units) {
   const Unit& unit = units ? units->UnitOf(*type) : BaseUnit(*type);
   const auto conversion = ConversionBetween(*series.scale, unit.scale);
   if (!conversion) return shown;
-  for (double& value : shown.values) value = (*conversion)(value);
   shown.unit = unit.abbreviation;
+  // In the same unit the values are taken along as they are: they may be many.
+  const bool isSame = (*conversion)(0) == 0 && (*conversion)(1) == 1;
+  if (!isSame)
+    for (double& value : shown.values.Change()) value = (*conversion)(value);
   return shown;
 }
 

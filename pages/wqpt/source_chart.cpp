@@ -32,7 +32,7 @@ Series InBaseUnit(const DrawnSource& source) {
   const Unit* unit = FindUnit(source.unit);
   const Unit& base = BaseOf(source.itemType);
   if (unit && AllowsUnit(*FindItemType(source.itemType), unit->key))
-    for (double& value : series.values) value = Convert(value, *unit, base);
+    for (double& value : series.values.Change()) value = Convert(value, *unit, base);
   series.name = source.name;
   series.unit = base.abbreviation;
   return series;
@@ -83,16 +83,18 @@ std::vector<Series> SumsOfMass(const std::vector<DrawnSource>& sources, const CY
     sum.name = "Sum of mass sources";
     sum.unit = BaseOf(itemType).abbreviation;
     sum.isStepped = true;
-    if (start.IsValid() && end.IsValid()) sum.times = {start, end};
-    for (const Series& each : series) sum.times.insert(sum.times.end(), each.times.begin(), each.times.end());
-    std::ranges::sort(sum.times);
-    sum.times.erase(std::unique(sum.times.begin(), sum.times.end()), sum.times.end());
-    for (const CYbDateTime& time : sum.times) {
+    std::vector<CYbDateTime> times;
+    if (start.IsValid() && end.IsValid()) times = {start, end};
+    for (const Series& each : series) times.insert(times.end(), each.times.begin(), each.times.end());
+    std::ranges::sort(times);
+    times.erase(std::unique(times.begin(), times.end()), times.end());
+    for (const CYbDateTime& time : times) {
       const bool isSimulated = time >= start && time <= end;
       double value = isSimulated ? constant : 0;
       for (const Series& each : series) value += ValueUpTo(each, time);
       sum.values.push_back(value);
     }
+    sum.times = std::move(times);
     sums.push_back(std::move(sum));
   }
   return sums;

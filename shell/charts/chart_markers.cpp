@@ -88,12 +88,18 @@ void ChartMarkers::MakeName(const DateMarker& marker) {
   names_.push_back(name);
 }
 
-void ChartMarkers::Show(const std::vector<DateMarker>& markers, const std::vector<QCPAxisRect*>& charts) {
-  // The items themselves went with the chart's content.
+void ChartMarkers::Clear() {
+  for (QCPItemText* name : names_) chart_.removeItem(name);
+  for (Lines* lines : lines_) chart_.removeItem(lines);
   names_.clear();
   lines_.clear();
   places_.clear();
+  markers_.clear();
   dragged_.reset();
+}
+
+void ChartMarkers::Show(const std::vector<DateMarker>& markers, const std::vector<QCPAxisRect*>& charts) {
+  Clear();
   charts_ = charts;
   markers_ = markers;
   std::erase_if(markers_, [](const DateMarker& marker) { return !marker.time.IsValid(); });

@@ -24,6 +24,8 @@ class ChartMarkers : public QObject {
  public:
   explicit ChartMarkers(QCustomPlot& chart);
 
+  /// Takes what is marked out of the chart; before its content goes.
+  void Clear();
   /// Marks dates over all charts that stand below each other; the names stand in the first one.
   void Show(const std::vector<DateMarker>& markers, const std::vector<QCPAxisRect*>& charts);
   /// What a dragged marker does, of markers that look the same.

@@ -5,6 +5,8 @@
 #include <QActionGroup>
 #include <QApplication>
 #include <QLabel>
+#include <QScrollBar>
+#include <QSignalBlocker>
 #include <algorithm>
 #include <array>
 #include <cmath>
@@ -19,6 +21,7 @@
 #include "shell/charts/chart_style.h"
 #include "shell/charts/dense_graph.h"
 #include "shell/charts/series_chooser.h"
+#include "shell/charts/series_points.h"
 #include "shell/charts/time_bars.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -26,6 +29,8 @@
 namespace tervane {
 
 namespace {
+
+constexpr int kLeastInSight = 4;  ///< Of charts below each other; a page scrolls where it has no room for so many.
 
 QString NameOf(const Series& series) {
   QString name = ToQt(series.name);
@@ -37,27 +42,21 @@ QString DateText(double seconds) {
   return ToQt(CYbDateTime::FromSecondsSinceEpoch(std::llround(seconds)).Format("%Y-%m-%d %H:%M:%S"));
 }
 
-std::size_t PlaceCount(const Series& series) {
-  return series.positions.empty() ? series.times.size() : series.positions.size();
-}
-
-/// On the horizontal axis; NaN where a value has no place.
-double ValueCoordinate(const Series& series, std::size_t number) {
-  if (!series.positions.empty()) return series.positions[number];
-  return series.times[number].IsValid() ? AxisCoordinate(series.times[number]) : std::nan("");
-}
-
 QString ValueText(double value) { return std::isnan(value) ? QString() : ToQt(FormatNumber(value, "%.6g")); }
 
 }  // namespace
 
 struct SeriesPlot::Curve {
   const Series* series;
+  std::size_t color;
   QCPGraph* graph;
 };
 
 SeriesPlot::SeriesPlot(Host& host, QWidget* parent)
-    : PlotFrame(host, parent), chart_(new QCustomPlot), message_(new QLabel(chart_)) {
+    : PlotFrame(host, parent),
+      chart_(new QCustomPlot),
+      scroll_(new QScrollBar(Qt::Vertical)),
+      message_(new QLabel(chart_)) {
   chart_->setMinimumSize(Theme::Get().Scaled(200), Theme::Get().Scaled(140));
   chart_->setFocusPolicy(Qt::StrongFocus);
   chart_->installEventFilter(this);
@@ -77,7 +76,10 @@ SeriesPlot::SeriesPlot(Host& host, QWidget* parent)
   message_->setAutoFillBackground(true);
   message_->setBackgroundRole(QPalette::Base);
   Hold({chart_, [this](double factor) { Zoom(factor); }, [this] { Fit(); },
-        [this](double pixelRatio) { return Picture(pixelRatio); }, [this] { return ValuesAsText(); }});
+        [this](double pixelRatio) { return Picture(pixelRatio); }, [this] { return ValuesAsText(); }, scroll_});
+  scroll_->setAccessibleName(tr("Further charts"));
+  scroll_->hide();
+  connect(scroll_, &QScrollBar::valueChanged, this, &SeriesPlot::ScrollTo);
   chooser_ = new SeriesChooser(host);
   AddToRow(chooser_);
   connect(chooser_, &SeriesChooser::Changed, this, &SeriesPlot::ShowChosen);
@@ -101,7 +103,10 @@ SeriesPlot::SeriesPlot(Host& host, QWidget* parent)
   connect(chart_, &QCustomPlot::mouseMove, this, &SeriesPlot::PointAt);
   connect(chart_, &QCustomPlot::mouseDoubleClick, this, &SeriesPlot::Fit);
   connect(&Theme::Get(), &Theme::Changed, this, [this] {
-    ApplyTheme();
+    if (PanelsInSight() == panelsInSight_)
+      ApplyTheme();
+    else
+      BuildPanels();
     chart_->replot(QCustomPlot::rpQueuedReplot);
   });
 }
@@ -113,8 +118,14 @@ QWidget* SeriesPlot::FocusTarget() const { return chart_; }
 void SeriesPlot::Show(SeriesContent content) {
   std::optional<DateRequest> request = std::exchange(content.request, {});
   chooser_->SetChoice(std::exchange(content.choice, {}));
-  if (isShown_ && LooksSame(content, given_)) {
-    markers_->SetMoves(content.markers);
+  if (isShown_ && LooksSameButForMarkers(content, given_)) {
+    if (LooksSame(content.markers, given_.markers)) {
+      markers_->SetMoves(content.markers);
+    } else {
+      given_.markers = content_.markers = std::move(content.markers);
+      ShowMarkers();
+      chart_->replot(QCustomPlot::rpQueuedReplot);
+    }
   } else {
     isShown_ = true;
     given_ = std::move(content);
@@ -155,6 +166,49 @@ SeriesContent SeriesPlot::InView() const {
 }
 
 void SeriesPlot::Build() {
+  panelCount_ = 1;
+  for (const Series& series : content_.series) panelCount_ = std::max(panelCount_, series.panel + 1);
+  chart_->setMinimumHeight(std::max(Theme::Get().Scaled(HasBars() ? 260 : 140),
+                                    panelCount_ > 1 ? HeightOf(std::min(panelCount_, kLeastInSight)) : 0));
+  message_->setText(content_.message.empty() ? tr("There is nothing to show.") : Translated(content_.message));
+  message_->setVisible(content_.IsEmpty());
+  places_ = PlacesOf(content_);
+  SetStatus({});
+  BuildPanels();
+  Fit();
+}
+
+int SeriesPlot::HeightOf(int panels) const {
+  // Of each of several charts, and of the axis below the last one.
+  constexpr int kPanelHeight = 100, kAxisHeight = 54;
+  return Theme::Get().Scaled(panels * kPanelHeight + kAxisHeight);
+}
+
+int SeriesPlot::PanelsInSight() const {
+  int panels = std::min(panelCount_, kLeastInSight);
+  while (panels < panelCount_ && HeightOf(panels + 1) <= chart_->height()) ++panels;
+  return panels;
+}
+
+void SeriesPlot::ScrollTo(int panel) {
+  const int first = std::clamp(panel, 0, panelCount_ - panelsInSight_);
+  if (first == firstPanel_) return;
+  firstPanel_ = first;
+  BuildPanels();
+  chart_->replot(QCustomPlot::rpQueuedReplot);
+}
+
+void SeriesPlot::BuildPanels() {
+  panelsInSight_ = PanelsInSight();
+  firstPanel_ = std::clamp(firstPanel_, 0, panelCount_ - panelsInSight_);
+  {
+    const QSignalBlocker isSetHere(scroll_);
+    scroll_->setRange(0, panelCount_ - panelsInSight_);
+    scroll_->setPageStep(panelsInSight_);
+    scroll_->setValue(firstPanel_);
+    scroll_->setVisible(panelsInSight_ < panelCount_);
+  }
+  markers_->Clear();
   chart_->clearPlottables();
   chart_->clearItems();
   curves_.clear();
@@ -163,37 +217,33 @@ void SeriesPlot::Build() {
   pointers_.clear();
   titles_.clear();
   bars_ = nullptr;
-  int panels = 1;
-  for (const Series& series : content_.series) panels = std::max(panels, series.panel + 1);
-  const bool hasBars = !content_.IsEmpty() && !content_.numbers && !content_.bars.empty();
   // More bars at once are drawn without their names.
   constexpr int kMostLines = 8;
-  const int stripLines = hasBars ? std::min(TimeBarPlottable::LanesOf(content_.bars), kMostLines) : 0;
-  panels_->SetUp(panels, stripLines, content_.numbers);
-  if (hasBars) BuildStrip();
-  // Of each of several charts, and of the axis below the last one.
-  constexpr int kPanelHeight = 100, kAxisHeight = 54;
-  const int least = std::max(hasBars ? 260 : 140, panels > 1 ? panels * kPanelHeight + kAxisHeight : 0);
-  chart_->setMinimumHeight(Theme::Get().Scaled(least));
-  for (int panel = 0; panel < panels; ++panel) BuildPanel(panel);
-  message_->setText(content_.message.empty() ? tr("There is nothing to show.") : Translated(content_.message));
-  message_->setVisible(content_.IsEmpty());
-  // The first one bears the names, which have no room in a strip.
-  std::vector<QCPAxisRect*> marked = panels_->Rects();
-  if (hasBars) std::ranges::rotate(marked, marked.begin() + 1);
-  markers_->Show(content_.IsEmpty() || content_.numbers ? std::vector<DateMarker>() : content_.markers, marked);
-  SetStatus({});
+  const int stripLines = HasBars() ? std::min(TimeBarPlottable::LanesOf(content_.bars), kMostLines) : 0;
+  const QCPRange seen = panels_->Keys().range();
+  panels_->SetUp(panelsInSight_, stripLines, content_.numbers);
+  for (QCPAxisRect* rect : panels_->Rects()) rect->axis(QCPAxis::atBottom)->setRange(seen);
+  if (HasBars()) BuildStrip();
+  for (int place = 0; place < panelsInSight_; ++place) BuildPanel(firstPanel_ + place, place);
+  for (QCPAxis* axis : panels_->AllValues()) FitValues(*axis);
+  ShowMarkers();
   ApplyTheme();
-  Fit();
 }
 
-void SeriesPlot::BuildPanel(int panel) {
+void SeriesPlot::ShowMarkers() {
+  // The first chart bears the names, which have no room in a strip.
+  std::vector<QCPAxisRect*> marked = panels_->Rects();
+  if (HasBars()) std::ranges::rotate(marked, marked.begin() + 1);
+  markers_->Show(content_.IsEmpty() || content_.numbers ? std::vector<DateMarker>() : content_.markers, marked);
+}
+
+void SeriesPlot::BuildPanel(int panel, int place) {
   // The first two units have an axis each; with more, all numbers stand on one, and the legend tells their units.
   std::vector<std::string> units;
   for (const Series& series : content_.series)
     if (series.panel == panel && std::ranges::find(units, series.unit) == units.end()) units.push_back(series.unit);
   const bool hasSecond = units.size() == 2;
-  QCPAxis &keys = panels_->Keys(panel), &left = panels_->Values(panel, false), &right = panels_->Values(panel, true);
+  QCPAxis &keys = panels_->Keys(place), &left = panels_->Values(place, false), &right = panels_->Values(place, true);
   const auto isOnRight = [&](const Series& series) { return hasSecond && series.unit == units[1]; };
   for (const bool isRight : {false, true}) {
     bool isLogarithmic = false, isLinear = false;
@@ -213,7 +263,7 @@ void SeriesPlot::BuildPanel(int panel) {
   if (static_cast<std::size_t>(panel) < content_.panelTitles.size())
     AddTitle(*left.axisRect(), content_.panelTitles[static_cast<std::size_t>(panel)]);
   AddPeriodAndPointer(keys, left);
-  if (!content_.numbers) MarkMissing(panel);
+  if (!content_.numbers) MarkMissing(panel, place);
 }
 
 void SeriesPlot::AddTitle(QCPAxisRect& rect, const std::string& text) {
@@ -267,9 +317,9 @@ QCPItemRect* SeriesPlot::AddSpan(QCPAxis& keys, QCPAxis& values, const CYbDateTi
   return span;
 }
 
-void SeriesPlot::MarkMissing(int panel) {
+void SeriesPlot::MarkMissing(int panel, int place) {
   const auto add = [&](const CYbDateTime& from, const CYbDateTime& to) {
-    hatches_.push_back(AddSpan(panels_->Keys(panel), panels_->Values(panel, false), from, to));
+    hatches_.push_back(AddSpan(panels_->Keys(place), panels_->Values(place, false), from, to));
   };
   constexpr std::size_t kMostGaps = 100;
   std::optional<std::pair<CYbDateTime, CYbDateTime>> covered;
@@ -289,33 +339,18 @@ void SeriesPlot::MarkMissing(int panel) {
 
 void SeriesPlot::AddCurve(const Series& series, QCPAxis* keys, QCPAxis* values) {
   auto* graph = new DenseGraph(keys, values);
-  const auto shown = QSharedPointer<QCPGraphDataContainer>::create();
-  QVector<QCPGraphData> points;
-  const std::size_t count = std::min(PlaceCount(series), series.values.size());
-  points.reserve(static_cast<qsizetype>(count));
   const bool isLogarithmic = content_.numbers && content_.numbers->isLogarithmic;
-  bool isSorted = true;
-  for (std::size_t i = 0; i < count; ++i) {
-    const double time = ValueCoordinate(series, i);
-    // A logarithmic axis has no place for what is not above 0.
-    if (std::isnan(time) || (isLogarithmic && time <= 0)) continue;
-    isSorted = isSorted && (points.isEmpty() || points.back().key <= time);
-    const bool hasPlace = values->scaleType() == QCPAxis::stLinear || series.values[i] > 0;
-    const double value = hasPlace ? series.values[i] : std::nan("");
-    // The value holds since the time before. (The chart's own steps lose all that stands behind a gap.)
-    if (series.isStepped && !points.isEmpty()) points.push_back({points.back().key, value});
-    points.push_back({time, value});
-  }
-  shown->set(points, isSorted);
+  const auto shown = PointsOf(series, isLogarithmic, values->scaleType() == QCPAxis::stLogarithmic);
   graph->setData(shown);
   graph->setName(NameOf(series));
   graph->setAdaptiveSampling(true);
   // A value between two gaps makes no line, and is seen as a point where points do not run together.
-  constexpr qsizetype kFewPoints = 60;
+  constexpr int kFewPoints = 60;
   if (series.isPoints) graph->setLineStyle(QCPGraph::lsNone);
-  if (series.isPoints || (points.size() <= kFewPoints && !series.isStepped))
+  if (series.isPoints || (shown->size() <= kFewPoints && !series.isStepped))
     graph->setScatterStyle(QCPScatterStyle(QCPScatterStyle::ssDisc, Theme::Get().Scaled(4)));
-  curves_.push_back({&series, graph});
+  const auto number = static_cast<std::size_t>(&series - content_.series.data());
+  curves_.push_back({&series, series.color.value_or(number), graph});
 }
 
 void SeriesPlot::ApplyTheme() {
@@ -324,15 +359,15 @@ void SeriesPlot::ApplyTheme() {
   const Theme& theme = Theme::Get();
   const QPalette colors = QApplication::palette();
   const QColor quiet = theme.QuietColor();
-  for (std::size_t i = 0; i < curves_.size(); ++i) {
-    const QColor color = CurveColor(curves_[i].series->color.value_or(i), theme.IsDark());
+  for (const Curve& curve : curves_) {
+    const QColor color = CurveColor(curve.color, theme.IsDark());
     // Wider pens are slow, and would join values that stand in neighbouring pixels.
-    const bool isDense = curves_[i].graph->data()->size() > 5000;
-    curves_[i].graph->setPen(QPen(color, isDense ? 1 : 1.4 * theme.Zoom()));
-    if (curves_[i].series->isStepped) {
+    const bool isDense = curve.graph->data()->size() > 5000;
+    curve.graph->setPen(QPen(color, isDense ? 1 : 1.4 * theme.Zoom()));
+    if (curve.series->isStepped) {
       QColor fill = color;
       fill.setAlpha(60);
-      curves_[i].graph->setBrush(fill);
+      curve.graph->setBrush(fill);
     }
   }
   QColor shade = theme.NoteColor();
@@ -361,13 +396,16 @@ void SeriesPlot::ApplyTheme() {
 void SeriesPlot::Arrange() {
   const QFontMetrics metrics(QApplication::font());
   int widest = 1;
-  for (const Curve& curve : curves_) widest = std::max(widest, metrics.horizontalAdvance(curve.graph->name()));
+  // Of all, so that the names keep their places while charts are scrolled.
+  for (const Series& series : content_.series) widest = std::max(widest, metrics.horizontalAdvance(NameOf(series)));
   ArrangeLegend(*chart_, widest);
   const QString longest = content_.numbers ? "0000.00" : "2000/00/00";
   for (QCPAxisRect* rect : panels_->Rects()) {
     const int places = rect->width() / (metrics.horizontalAdvance(longest) * 3 / 2);
     rect->axis(QCPAxis::atBottom)->ticker()->setTickCount(std::clamp(places, 2, 9));
-    const int numbers = std::clamp(rect->height() / (3 * metrics.height()), 2, 7);
+    // A chart that shares the height since just now still has its height of before.
+    const int height = std::min(rect->height(), chart_->height() / panelsInSight_);
+    const int numbers = std::clamp(height / (3 * metrics.height()), 2, 7);
     for (const auto side : {QCPAxis::atLeft, QCPAxis::atRight}) rect->axis(side)->ticker()->setTickCount(numbers);
   }
   markers_->Arrange();
@@ -375,27 +413,24 @@ void SeriesPlot::Arrange() {
 
 void SeriesPlot::Fit() {
   std::optional<QCPRange> keys;
-  for (const Curve& curve : curves_) {
-    bool isFound = false;
-    const bool isLogarithmic = content_.numbers && content_.numbers->isLogarithmic;
-    const QCPRange own = curve.graph->getKeyRange(isFound, isLogarithmic ? QCP::sdPositive : QCP::sdBoth);
-    if (isFound) keys = keys ? keys->expanded(own) : own;
-  }
+  if (places_) keys = QCPRange(places_->first, places_->second);
   bool hasBars = false;
   const QCPRange barred = bars_ ? bars_->getKeyRange(hasBars, QCP::sdBoth) : QCPRange();
   if (hasBars) keys = keys ? keys->expanded(barred) : barred;
   // The simulation is seen as a whole, also where the series do not cover it.
   if (keys && !periods_.empty())
     keys = keys->expanded({AxisCoordinate(content_.period->first), AxisCoordinate(content_.period->second)});
-  for (QCPAxis* axis : panels_->AllValues()) {
-    axis->rescale();
-    // Curves keep off the frame, but what starts at zero stands on it. Names stand above the curves.
-    const bool standsOnZero = axis->range().lower == 0;
-    axis->setRange(WithRoom(*axis, standsOnZero ? 0 : 0.04, 0.08));
-  }
+  for (QCPAxis* axis : panels_->AllValues()) FitValues(*axis);
   if (keys) panels_->Keys().setRange(*keys);
   if (panels_->Keys().range().size() <= 0) panels_->Keys().scaleRange(1.02);
   chart_->replot(QCustomPlot::rpQueuedReplot);
+}
+
+void SeriesPlot::FitValues(QCPAxis& axis) {
+  axis.rescale();
+  // Curves keep off the frame, but what starts at zero stands on it. Names stand above the curves.
+  const bool standsOnZero = axis.range().lower == 0;
+  axis.setRange(WithRoom(axis, standsOnZero ? 0 : 0.04, 0.08));
 }
 
 void SeriesPlot::Zoom(double factor) {
@@ -427,6 +462,11 @@ bool SeriesPlot::Press(int key) {
     case Qt::Key_Home:
       Fit();
       return true;
+    case Qt::Key_PageUp:
+    case Qt::Key_PageDown:
+      if (panelsInSight_ == panelCount_) return false;
+      ScrollTo(firstPanel_ + (key == Qt::Key_PageUp ? -panelsInSight_ : panelsInSight_));
+      return true;
     default:
       return false;
   }
@@ -436,7 +476,10 @@ bool SeriesPlot::Press(int key) {
 
 bool SeriesPlot::eventFilter(QObject* watched, QEvent* event) {
   if (event->type() == QEvent::KeyPress && !content_.IsEmpty()) return Press(static_cast<QKeyEvent*>(event)->key());
-  if (event->type() == QEvent::Resize) message_->setGeometry(chart_->rect());
+  if (event->type() == QEvent::Resize) {
+    message_->setGeometry(chart_->rect());
+    if (PanelsInSight() != panelsInSight_) BuildPanels();
+  }
   if (event->type() == QEvent::Leave) {
     SetStatus({});
     for (QCPItemStraightLine* pointer : pointers_) pointer->setVisible(false);
@@ -508,7 +551,20 @@ QString SeriesPlot::ValuesAsText() const {
 }
 
 QImage SeriesPlot::Picture(double pixelRatio) {
-  return chart_->toPixmap(chart_->width(), chart_->height(), pixelRatio).toImage();
+  if (panelsInSight_ == panelCount_) return chart_->toPixmap(chart_->width(), chart_->height(), pixelRatio).toImage();
+  // All charts, as they would stand in a window of their height.
+  SeriesPlot whole(Outside());
+  QCustomPlot& chart = *whole.chart_;
+  chart.resize(chart_->width(), HeightOf(panelCount_));
+  chart.setViewport(chart.rect());
+  whole.view_ = view_;
+  whole.Show(given_);
+  whole.panels_->Keys().setRange(panels_->Keys().range());
+  for (const auto phase : {QCPLayoutElement::upPreparation, QCPLayoutElement::upMargins, QCPLayoutElement::upLayout})
+    chart.plotLayout()->update(phase);
+  whole.Arrange();
+  constexpr double kMostPixels = 32000;  // in height: the toolkit paints no more
+  return chart.toPixmap(chart.width(), chart.height(), std::min(pixelRatio, kMostPixels / chart.height())).toImage();
 }
 
 }  // namespace tervane

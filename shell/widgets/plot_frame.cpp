@@ -47,7 +47,11 @@ void PlotFrame::Hold(Plot plot) {
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(2);
-  column->addWidget(plot_.widget, 1);
+  auto* plotRow = new QHBoxLayout;
+  plotRow->setSpacing(0);
+  plotRow->addWidget(plot_.widget, 1);
+  if (plot_.beside) plotRow->addWidget(plot_.beside);
+  column->addLayout(plotRow, 1);
   row_ = new QHBoxLayout;
   row_->setSpacing(2);
   row_->addSpacing(Theme::Get().Scaled(4));

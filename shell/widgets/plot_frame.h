@@ -33,6 +33,7 @@ class PlotFrame : public QWidget {
     std::function<void()> fit;
     std::function<QImage(double pixelRatio)> picture;
     std::function<QString()> values = {};  ///< As text, tabs between the columns; of plots that show values over time.
+    QWidget* beside = nullptr;             ///< On its right: a bar to scroll what does not fit.
   };
 
   void SetStatus(const QString& text);

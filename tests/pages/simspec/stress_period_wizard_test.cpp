@@ -120,7 +120,7 @@ TEST(StressPeriodWizard, MakesPeriodsOfMonthsAndYears) {
 TEST(StressPeriodWizard, ASeriesChangesWhereItHasAnotherValue) {
   const double gap = std::nan("");
   Series series;
-  for (int day = 1; day <= 8; ++day) series.times.emplace_back(2000, 1, day);
+  for (int day = 1; day <= 8; ++day) series.times.push_back({2000, 1, day});
   series.values = {1, 1, 2, 2, gap, gap, 3, 3};
   EXPECT_THAT(ChangesOf(series, {2000, 1, 1}, {2000, 2, 1}),
               ElementsAre(CYbDateTime(2000, 1, 3), CYbDateTime(2000, 1, 5), CYbDateTime(2000, 1, 7)));

@@ -2,14 +2,20 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/charts/series_plot.h"
 
+#include <QClipboard>
 #include <QLineEdit>
 #include <QListWidget>
+#include <QScrollBar>
 #include <QTest>
 #include <algorithm>
 #include <cmath>
 #include <functional>
 #include <limits>
+#include <set>
+#include <string>
+#include <vector>
 
+#include <fmt/format.h>
 #include <gmock/gmock.h>
 #include <qcustomplot.h>
 
@@ -22,6 +28,7 @@ namespace {
 
 using test::Hover;
 using test::Wheel;
+using testing::ElementsAre;
 
 constexpr double kGap = std::numeric_limits<double>::quiet_NaN();
 
@@ -188,7 +195,8 @@ TEST(SeriesPlot, ManyValuesLookAsIfEachLineWereDrawn) {
     SeriesContent content;
     content.series = {Daily("Flow", "m3/s", row.values, row.isStepped)};
     for (std::size_t i = kValues / 2; i < kValues; ++i)
-      content.series[0].times[i] = content.series[0].times[i] + CYbDateTimeSpan::Days(static_cast<double>(row.jump));
+      content.series[0].times.Change()[i] =
+          content.series[0].times[i] + CYbDateTimeSpan::Days(static_cast<double>(row.jump));
     ShownChart shown(std::move(content));
     QCustomPlot& chart = shown.Chart();
     shown.Plot().Zoom(row.zoom);
@@ -295,6 +303,72 @@ TEST(SeriesPlot, ChartsBelowEachOtherShareTheirTimeAndHaveAxesOfTheirOwn) {
   chart.Plot().Show(content);
   EXPECT_EQ(chart.Chart().axisRectCount(), 1);
   EXPECT_TRUE(chart.Chart().xAxis->tickLabels());
+}
+
+TEST(SeriesPlot, OfManyChartsThoseInSightAreMadeAndTheOthersAreScrolledTo) {
+  constexpr int kPanels = 30;
+  SeriesContent content;
+  for (int panel = 0; panel < kPanels; ++panel) {
+    Series& series = content.series.emplace_back(Daily(fmt::format("Well {}", panel + 1), "m", {1.0 * panel, 2, 3}));
+    series.panel = panel;
+  }
+  // The last one is later than all others.
+  content.series.back().times = {CYbDateTime(2000, 1, 1), CYbDateTime(2000, 1, 5), CYbDateTime(2000, 1, 11)};
+  content.markers = {{.name = "1", .time = CYbDateTime(2000, 1, 2)}};
+  ShownChart chart(content);
+  SeriesPlot& plot = chart.Plot();
+  const auto shown = [&] {
+    std::vector<std::string> names;
+    for (int i = 0; i < chart.Chart().graphCount(); ++i) names.push_back(chart.Chart().graph(i)->name().toStdString());
+    return names;
+  };
+  auto* const bar = plot.findChild<QScrollBar*>();
+  ASSERT_TRUE(bar->isVisible());
+  EXPECT_THAT(shown(), ElementsAre("Well 1 [m]", "Well 2 [m]", "Well 3 [m]", "Well 4 [m]"));
+  // All of them decide what is shown of the time, and a table has all.
+  EXPECT_EQ(chart.Chart().xAxis->range().size(), 10 * 86400);
+  EXPECT_THAT(plot.ValuesAsText().toStdString(), testing::HasSubstr("Well 30 [m]"));
+  const QColor secondColor = chart.Chart().graph(1)->pen().color();
+
+  plot.Zoom(2);
+  const QCPRange seen = chart.Chart().xAxis->range();
+  bar->setValue(1);
+  EXPECT_THAT(shown(), ElementsAre("Well 2 [m]", "Well 3 [m]", "Well 4 [m]", "Well 5 [m]"));
+  EXPECT_EQ(chart.Chart().graph(0)->pen().color(), secondColor);
+  for (const QCPAxisRect* rect : chart.Chart().axisRects()) EXPECT_EQ(rect->axis(QCPAxis::atBottom)->range(), seen);
+  QTest::keyClick(&chart.Chart(), Qt::Key_PageDown);
+  EXPECT_EQ(shown().front(), "Well 6 [m]");
+  bar->setValue(bar->maximum());
+  EXPECT_EQ(shown().back(), "Well 30 [m]");
+  // A marked date moves, and all else stays as the user has it.
+  content.markers[0].time = CYbDateTime(2000, 1, 3);
+  plot.Show(content);
+  EXPECT_EQ(shown().back(), "Well 30 [m]");
+  EXPECT_EQ(chart.Chart().xAxis->range(), seen);
+  // More room shows more of them.
+  plot.resize(800, 900);
+  for (int i = 0; i < 3; ++i) QApplication::processEvents();
+  EXPECT_GT(chart.Chart().graphCount(), 6);
+  EXPECT_EQ(shown().back(), "Well 30 [m]");
+  EXPECT_EQ(bar->maximum(), kPanels - chart.Chart().graphCount());
+  plot.resize(800, 400);
+  for (int i = 0; i < 3; ++i) QApplication::processEvents();
+
+  // A picture that is taken along shows all, those out of sight too.
+  for (QAction* action : chart.Chart().actions())
+    if (action->text() == "&Copy picture") action->trigger();
+  const QImage picture = QApplication::clipboard()->image();
+  EXPECT_GT(picture.height(), 2 * 100 * kPanels);
+  std::set<QRgb> colors;
+  for (int y = 0; y < picture.height(); ++y)
+    for (int x = 0; x < picture.width(); x += 3) colors.insert(picture.pixel(x, y));
+  for (std::size_t curve = 0; curve < 8; ++curve) EXPECT_TRUE(colors.contains(CurveColor(curve, false).rgb())) << curve;
+  EXPECT_EQ(shown().size(), 4);
+
+  content.series.resize(2);
+  plot.Show(content);
+  EXPECT_FALSE(bar->isVisible());
+  EXPECT_THAT(shown(), ElementsAre("Well 1 [m]", "Well 2 [m]"));
 }
 
 TEST(SeriesPlot, CurvesOverANumberTellItWithItsUnit) {
