@@ -42,6 +42,14 @@ constexpr ModflowSolverKind kSIP{"SIP Subsurface Computational Control Parameter
 constexpr ModflowSolverKind kSOR{"SOR Subsurface Computational Control Parameters", "", "CompControlParaModSOR",
                                  kSolverSOR};
 
+// What several solvers have.
+constexpr std::string_view kIterationsLabel = "Maximum number of iterations",
+                           kOuterIterationsLabel = "Maximum number of outer iterations",
+                           kInnerIterationsLabel = "Maximum number of inner iterations",
+                           kHeadChangeLabel = "Head change criterion for convergence",
+                           kAccelerationLabel = "Acceleration parameter",
+                           kPrintoutLabel = "Printout interval for maximum head change", kOutput = "Output";
+
 constexpr std::string_view kOuterIterations = "Maximum number of outer iterations must be a positive value";
 
 // How the file tells a kind of damping in the place of its value.
@@ -56,10 +64,15 @@ CCompControlParaModBase::CCompControlParaModBase(const ModflowSolverKind& kind, 
 }
 
 int CCompControlParaModBase::ValidateData() {
+  std::vector<KeyInfo> keys;
+  DescribeKeys(keys);
   bool isValid = true;
-  for (const SolverDemand& demand : Demands()) {
-    if (demand.isMet) continue;
-    AddError(std::string(demand.error), std::string(demand.key));
+  for (const SolverField& field : Fields()) {
+    const auto isMet = [&](const auto* value) { return field.demand->allowsZero ? *value >= 0 : *value > 0; };
+    if (!field.demand || !field.demand->when.Holds(*this) || std::visit(isMet, field.value)) continue;
+    const void* const member = std::visit([](const void* value) { return value; }, field.value);
+    const auto key = std::ranges::find(keys, member, &KeyInfo::member);
+    AddError(std::string(field.demand->error), key == keys.end() ? std::string() : key->key);
     isValid = false;
   }
   return isValid;
@@ -109,18 +122,56 @@ void CCompControlParaModLMGKvf::TakeUseDefault(int use) {
   STOR3 = kDefaultSTOR3;
 }
 
-std::vector<SolverDemand> CCompControlParaModLMGKvf::Demands() const {
-  const bool isReduced = DampingKind == kRelativeReducedResidual;
-  // The storage is asked for where the defaults are used.
-  return {{"MXITER", MXITER >= 0, kOuterIterations},
-          {"MXCYC", MXCYC >= 0, "Maximum number of cycles must be a positive value"},
-          {"BCLOSE", BCLOSE > 0, "Budget closure criterion must be greater than 0"},
-          {"DAMP", DampingKind != kSpecified || DAMP > 0, "Specified damping value must be greater than 0"},
-          {"DUP", !isReduced || DUP > 0, "Maximum damping value must be greater than 0"},
-          {"DLOW", !isReduced || DLOW > 0, "Minimum damping value must be greater than 0"},
-          {"STOR1", !UseDefault || STOR1 > 0, "Storage for A and JA matrices must be greater than 0"},
-          {"STOR2", !UseDefault || STOR2 > 0, "Storage for U, FRHS and IA matrices must be greater than 0"},
-          {"STOR3", !UseDefault || STOR3 > 0, "Storage for IG matrix must be greater than 0"}};
+std::vector<SolverField> CCompControlParaModLMGKvf::Fields() {
+  constexpr std::string_view kDamping = "Damping", kStorage = "Storage";
+  const Condition isReduced = Is(DampingKind, kRelativeReducedResidual), isSpecified = Is(DampingKind, kSpecified);
+  // Storage that the user tells is not checked; that of the defaults is.
+  const Condition usesDefault = On(UseDefault);
+  const auto storage = [&](float& value, std::string_view label, std::string_view error) {
+    return SolverField{.value = &value,
+                       .label = label,
+                       .frame = kStorage,
+                       .enabled = !usesDefault,
+                       .demand = SolverField::Demand{error, false, usesDefault}};
+  };
+  return {{.value = &MXITER, .label = kIterationsLabel, .demand = SolverField::Demand{kOuterIterations, true}},
+          {.value = &MXCYC,
+           .label = "Maximum number of cycles per iteration",
+           .demand = SolverField::Demand{"Maximum number of cycles must be a positive value", true}},
+          {.value = &BCLOSE,
+           .label = "Budget closure criterion",
+           .demand = SolverField::Demand{"Budget closure criterion must be greater than 0"}},
+          {.value = &ICG, .label = "Use Conjugate gradient iterations (recommended)", .kind = SolverField::Kind::Check},
+          {.value = &DampingKind,
+           .kind = SolverField::Kind::Options,
+           .frame = kDamping,
+           .choices = kDampings,
+           .key = "DAMP"},
+          {.value = &DUP,
+           .label = "Maximum damping value",
+           .frame = kDamping,
+           .enabled = isReduced,
+           .demand = SolverField::Demand{"Maximum damping value must be greater than 0", false, isReduced}},
+          {.value = &DLOW,
+           .label = "Minimum damping value",
+           .frame = kDamping,
+           .enabled = isReduced,
+           .demand = SolverField::Demand{"Minimum damping value must be greater than 0", false, isReduced}},
+          {.value = &DAMP,
+           .label = "Damping value (1.0 = no damping)",
+           .frame = kDamping,
+           .enabled = isSpecified,
+           .demand = SolverField::Demand{"Specified damping value must be greater than 0", false, isSpecified}},
+          {.value = &UseDefault,
+           .label = "Use defaults (recommended)",
+           .kind = SolverField::Kind::Check,
+           .frame = kStorage,
+           .then = [this] { TakeUseDefault(UseDefault); }},
+          storage(STOR1, "Storage for A and JA matrices", "Storage for A and JA matrices must be greater than 0"),
+          storage(STOR2, "Storage for U, FRHS and IA matrices",
+                  "Storage for U, FRHS and IA matrices must be greater than 0"),
+          storage(STOR3, "Storage for IG matrix", "Storage for IG matrix must be greater than 0"),
+          {.value = &IOUTAMG, .kind = SolverField::Kind::Options, .frame = kOutput}};
 }
 
 CCompControlParaModPCG2Kvf::CCompControlParaModPCG2Kvf(CYbSEKvfBase* parent) : CCompControlParaModBase(kPCG2, parent) {}
@@ -136,12 +187,22 @@ void CCompControlParaModPCG2Kvf::ExchangeKeys(KeyExchange& keys) {
   keys("DAMP", DAMP);
 }
 
-std::vector<SolverDemand> CCompControlParaModPCG2Kvf::Demands() const {
-  return {{"MXITER", MXITER >= 0, kOuterIterations},
-          {"ITER1", ITER1 >= 0, "Maximum number of inner iterations must be a positive value"},
-          {"HCLOSE", HCLOSE > 0, "Head change must be greater than 0"},
-          {"RCLOSE", RCLOSE > 0, "Residual criterion for convergence must be greater than 0"},
-          {"RELAX", RELAX > 0, "Relaxation parameter must be greater than 0"}};
+std::vector<SolverField> CCompControlParaModPCG2Kvf::Fields() {
+  return {{.value = &MXITER, .label = kOuterIterationsLabel, .demand = SolverField::Demand{kOuterIterations, true}},
+          {.value = &ITER1,
+           .label = kInnerIterationsLabel,
+           .demand = SolverField::Demand{"Maximum number of inner iterations must be a positive value", true}},
+          {.value = &HCLOSE,
+           .label = kHeadChangeLabel,
+           .demand = SolverField::Demand{"Head change must be greater than 0"}},
+          {.value = &RCLOSE,
+           .label = "Residual criterion for convergence",
+           .demand = SolverField::Demand{"Residual criterion for convergence must be greater than 0"}},
+          {.value = &RELAX,
+           .label = "Relaxation Parameter",
+           .demand = SolverField::Demand{"Relaxation parameter must be greater than 0"}},
+          {.value = &DAMP, .label = "Damping Factor"},
+          {.value = &MUTPCG, .kind = SolverField::Kind::Options, .frame = kOutput}};
 }
 
 CCompControlParaModPCG4Kvf::CCompControlParaModPCG4Kvf(CYbSEKvfBase* parent) : CCompControlParaModBase(kPCG4, parent) {}
@@ -164,6 +225,22 @@ void CCompControlParaModPCG4Kvf::ExchangeKeys(KeyExchange& keys) {
   keys("OutputFromSolver", OutputFromSolver).OneOf(kSolverOutputs);
 }
 
+std::vector<SolverField> CCompControlParaModPCG4Kvf::Fields() {
+  constexpr std::string_view kBacktracking = "Additional parameters for Newton-Raphson backtracking scheme";
+  const Condition isNewton = On(UseNewtonRaphson);
+  return {{.value = &MXITER, .label = kOuterIterationsLabel},
+          {.value = &ITERI, .label = kInnerIterationsLabel},
+          {.value = &HCLOSE, .label = kHeadChangeLabel},
+          {.value = &MNORTH, .label = "Maximum number of orthogonalizations"},
+          {.value = &ApplyDampening, .label = "Apply dampening", .kind = SolverField::Kind::Check},
+          {.value = &UseNewtonRaphson,
+           .label = "Use Newton-Raphson linearization with backtracking",
+           .kind = SolverField::Kind::Check},
+          {.value = &BFACT, .label = "Backtracking factor", .frame = kBacktracking, .enabled = isNewton},
+          {.value = &RESRED, .label = "Residual reduction factor", .frame = kBacktracking, .enabled = isNewton},
+          {.value = &OutputFromSolver, .kind = SolverField::Kind::Options, .frame = kOutput}};
+}
+
 CCompControlParaModSIPKvf::CCompControlParaModSIPKvf(CYbSEKvfBase* parent) : CCompControlParaModBase(kSIP, parent) {}
 
 void CCompControlParaModSIPKvf::ExchangeKeys(KeyExchange& keys) {
@@ -177,6 +254,16 @@ void CCompControlParaModSIPKvf::ExchangeKeys(KeyExchange& keys) {
   keys.WriteOnly("IPCALC", SeedOption == kSpecified ? 0 : 1);
 }
 
+std::vector<SolverField> CCompControlParaModSIPKvf::Fields() {
+  return {{.value = &MXITER, .label = kIterationsLabel},
+          {.value = &NPARM, .label = "Number of iteration parameters"},
+          {.value = &ACCL, .label = kAccelerationLabel},
+          {.value = &HCLOSE, .label = kHeadChangeLabel},
+          {.value = &IPRSIP, .label = kPrintoutLabel},
+          {.value = &SeedOption, .kind = SolverField::Kind::Options, .frame = "Seed"},
+          {.value = &WSEED, .label = "Seed", .frame = "Seed", .enabled = Is(SeedOption, kSpecified)}};
+}
+
 CCompControlParaModSORKvf::CCompControlParaModSORKvf(CYbSEKvfBase* parent) : CCompControlParaModBase(kSOR, parent) {}
 
 void CCompControlParaModSORKvf::ExchangeKeys(KeyExchange& keys) {
@@ -184,6 +271,13 @@ void CCompControlParaModSORKvf::ExchangeKeys(KeyExchange& keys) {
   keys("HCLOSE", HCLOSE);
   keys("ACCL", ACCL);
   keys("IPRSOR", IPRSOR);
+}
+
+std::vector<SolverField> CCompControlParaModSORKvf::Fields() {
+  return {{.value = &MXITER, .label = kIterationsLabel},
+          {.value = &HCLOSE, .label = kHeadChangeLabel},
+          {.value = &ACCL, .label = kAccelerationLabel},
+          {.value = &IPRSOR, .label = kPrintoutLabel}};
 }
 
 // ---- The choice

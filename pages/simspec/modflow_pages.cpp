@@ -19,75 +19,29 @@ bool HasTimeStepOutput(const CYbSEKvfBase& node) { return WithTimeStepOutput().H
 
 // ---- Solvers
 
-std::shared_ptr<PageForm> SorForm(CCompControlParaModSORKvf& n) {
-  auto form = std::make_shared<PageForm>(n);
-  form->Integer("Maximum number of iterations", n.MXITER);
-  form->Number("Head change criterion for convergence", n.HCLOSE);
-  form->Number("Acceleration parameter", n.ACCL);
-  form->Integer("Printout interval for maximum head change", n.IPRSOR);
-  return form;
+Control& AddField(PageForm& form, const SolverField& field) {
+  const std::string label(field.label);
+  if (float* const* number = std::get_if<float*>(&field.value)) return form.Number(label, **number);
+  int& value = *std::get<int*>(field.value);
+  if (field.kind == SolverField::Kind::Check) return form.Check(label, value);
+  if (field.kind == SolverField::Kind::Number) return form.Integer(label, value);
+  std::vector<std::string> options;
+  for (const KeyChoice& choice : field.choices) options.emplace_back(choice.text);
+  return form.Radio(label, value, options);
 }
 
-std::shared_ptr<PageForm> SipForm(CCompControlParaModSIPKvf& n) {
-  auto form = std::make_shared<PageForm>(n);
-  form->Integer("Maximum number of iterations", n.MXITER);
-  form->Integer("Number of iteration parameters", n.NPARM);
-  form->Number("Acceleration parameter", n.ACCL);
-  form->Number("Head change criterion for convergence", n.HCLOSE);
-  form->Integer("Printout interval for maximum head change", n.IPRSIP);
-  PageForm& seed = form->Group("Seed");
-  seed.Radio("", n.SeedOption);
-  seed.Number("Seed", n.WSEED).EnabledWhen(Is(n.SeedOption, CCompControlParaModSIPKvf::kSpecified));
-  return form;
-}
-
-std::shared_ptr<PageForm> Pcg4Form(CCompControlParaModPCG4Kvf& n) {
-  auto form = std::make_shared<PageForm>(n);
-  form->Integer("Maximum number of outer iterations", n.MXITER);
-  form->Integer("Maximum number of inner iterations", n.ITERI);
-  form->Number("Head change criterion for convergence", n.HCLOSE);
-  form->Integer("Maximum number of orthogonalizations", n.MNORTH);
-  form->Check("Apply dampening", n.ApplyDampening);
-  form->Check("Use Newton-Raphson linearization with backtracking", n.UseNewtonRaphson);
-  PageForm& backtracking = form->Group("Additional parameters for Newton-Raphson backtracking scheme");
-  backtracking.Number("Backtracking factor", n.BFACT).EnabledWhen(On(n.UseNewtonRaphson));
-  backtracking.Number("Residual reduction factor", n.RESRED).EnabledWhen(On(n.UseNewtonRaphson));
-  form->Group("Output").Radio("", n.OutputFromSolver);
-  return form;
-}
-
-std::shared_ptr<PageForm> Pcg2Form(CCompControlParaModPCG2Kvf& n) {
-  auto form = std::make_shared<PageForm>(n);
-  form->Integer("Maximum number of outer iterations", n.MXITER);
-  form->Integer("Maximum number of inner iterations", n.ITER1);
-  form->Number("Head change criterion for convergence", n.HCLOSE);
-  form->Number("Residual criterion for convergence", n.RCLOSE);
-  form->Number("Relaxation Parameter", n.RELAX);
-  form->Number("Damping Factor", n.DAMP);
-  form->Group("Output").Radio("", n.MUTPCG);
-  return form;
-}
-
-std::shared_ptr<PageForm> LmgForm(CCompControlParaModLMGKvf& n) {
-  using Solver = CCompControlParaModLMGKvf;
-  auto form = std::make_shared<PageForm>(n);
-  form->Integer("Maximum number of iterations", n.MXITER);
-  form->Integer("Maximum number of cycles per iteration", n.MXCYC);
-  form->Number("Budget closure criterion", n.BCLOSE);
-  form->Check("Use Conjugate gradient iterations (recommended)", n.ICG);
-  PageForm& damping = form->Group("Damping");
-  damping.Radio("", n.DampingKind, {"Cooley's method", "Relative reduced residual method", "Specified damping"})
-      .Key("DAMP");
-  const Condition isReduced = Is(n.DampingKind, Solver::kRelativeReducedResidual);
-  damping.Number("Maximum damping value", n.DUP).EnabledWhen(isReduced);
-  damping.Number("Minimum damping value", n.DLOW).EnabledWhen(isReduced);
-  damping.Number("Damping value (1.0 = no damping)", n.DAMP).EnabledWhen(Is(n.DampingKind, Solver::kSpecified));
-  PageForm& storage = form->Group("Storage");
-  storage.Check("Use defaults (recommended)", n.UseDefault).Then([&n] { return n.TakeUseDefault(n.UseDefault), 0; });
-  storage.Number("Storage for A and JA matrices", n.STOR1).EnabledWhen(!On(n.UseDefault));
-  storage.Number("Storage for U, FRHS and IA matrices", n.STOR2).EnabledWhen(!On(n.UseDefault));
-  storage.Number("Storage for IG matrix", n.STOR3).EnabledWhen(!On(n.UseDefault));
-  form->Group("Output").Radio("", n.IOUTAMG);
+std::shared_ptr<PageForm> SolverForm(CCompControlParaModBase& solver) {
+  auto form = std::make_shared<PageForm>(solver);
+  std::string_view frame;
+  PageForm* place = form.get();
+  for (const SolverField& field : solver.Fields()) {
+    if (field.frame != frame) place = field.frame.empty() ? form.get() : &form->Group(std::string(field.frame));
+    frame = field.frame;
+    Control& control = AddField(*place, field);
+    if (!field.enabled.IsAlways()) control.EnabledWhen(field.enabled);
+    if (!field.key.empty()) control.Key(std::string(field.key));
+    if (field.then) control.Then([then = field.then] { return then(), 0; });
+  }
   return form;
 }
 
@@ -111,9 +65,9 @@ void DescribeSolvers(PageForm& form, CCompControlParaModKvf& n) {
           })
       .Key("SolverOption");
   // In the order of the values of the option.
-  form.SubForms({SorForm(*n.Child<CCompControlParaModSORKvf>()), SipForm(*n.Child<CCompControlParaModSIPKvf>()),
-                 Pcg4Form(*n.Child<CCompControlParaModPCG4Kvf>()), Pcg2Form(*n.Child<CCompControlParaModPCG2Kvf>()),
-                 LmgForm(*n.Child<CCompControlParaModLMGKvf>())},
+  form.SubForms({SolverForm(*n.Child<CCompControlParaModSORKvf>()), SolverForm(*n.Child<CCompControlParaModSIPKvf>()),
+                 SolverForm(*n.Child<CCompControlParaModPCG4Kvf>()), SolverForm(*n.Child<CCompControlParaModPCG2Kvf>()),
+                 SolverForm(*n.Child<CCompControlParaModLMGKvf>())},
                 [&n] { return n.SolverOption; });
   form.MendWhenShown("Choose a Solver of the Engine", [&n, place] {
     if (SolversOfEngine(EngineOf(n)).empty() || place() >= 0) return false;
