@@ -145,6 +145,8 @@ class BoundaryBuilder {
 
   bool AddSegments(const CGeoDataBoundCondListKvf& list) {
     const std::vector<int> segments = SegmentsOnCells(list, building_.domain);
+    // All lists of boundaries share the domain's trace.
+    if (const auto* traced = list.GetCatchmentData(); traced && widths_.empty()) widths_ = LengthsInCells(*traced);
     for (int number = 1; number <= list.GetItemCount(); ++number) {
       const CGeoDataBoundCondItemKvf& segment = *list.GetItem(number);
       const std::string name = fmt::format("{}_{}", segment.GetTitle(), layer_ + 1);
@@ -171,21 +173,26 @@ class BoundaryBuilder {
     return true;
   }
 
-  /// A flux is shared by the cells of its segment; a gradient drives what the ground lets through.
+  /// A flux is shared by the cells of its segment by the length of the boundary in each; a gradient drives what the
+  /// ground lets through there.
   bool AddRates(const CGeoDataBoundCondItemKvf& segment, std::vector<StressEntry> entries) {
     const bool isFlux = segment.BoundaryType == CGeoDataBoundCondItemKvf::kFlux;
+    double whole = 0;
+    for (const StressEntry& entry : entries) whole += widths_[entry.cell];
     std::vector<double> shares;
     for (const StressEntry& entry : entries) {
+      const double width = widths_[entry.cell];
       const double through = static_cast<double>(layer().conductivity.At(entry.cell)) *
-                             static_cast<double>(layer().top[entry.cell] - layer().bottom[entry.cell]) *
-                             building_.model.geometry.cellSize;
-      shares.push_back(isFlux ? kSecondsOfDay / static_cast<double>(entries.size()) : through);
+                             static_cast<double>(layer().top[entry.cell] - layer().bottom[entry.cell]) * width;
+      // One cell that is all of a domain has no line along it.
+      const double part = whole > 0 ? width / whole : 1 / static_cast<double>(entries.size());
+      shares.push_back(isFlux ? kSecondsOfDay * part : through);
     }
     if (!Follow(segment, segment, segment.GetBoundaryQuantity(), std::move(entries), std::move(shares), rates_.sources))
       return false;
     building_.Tell(isFlux ? Fate::Carried : Fate::Changed, segment,
-                   isFlux ? "rates of WEL, in equal parts; what is above 0 comes in"
-                          : "rates of WEL: the gradient times what the whole layer lets through");
+                   isFlux ? "rates of WEL, by the length of the boundary in each cell; what is above 0 comes in"
+                          : "rates of WEL: the gradient times what the layer lets through in each cell");
     return true;
   }
 
@@ -232,6 +239,7 @@ class BoundaryBuilder {
   Building& building_;
   std::size_t layer_ = 0;
   std::vector<bool> hasHead_;
+  std::vector<double> widths_;  ///< Of the outer boundary in each cell.
   Making heads_{{.kind = "CHD", .name = "chd", .names = {}}};
   Making general_{{.kind = "GHB", .name = "ghb", .names = {}}};
   Making drains_{{.kind = "DRN", .name = "inner_drn", .names = {}}};

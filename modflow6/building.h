@@ -85,6 +85,8 @@ bool BuildBoundaries(Building& building);
 bool BuildWells(Building& building);
 /// DRN
 bool BuildDrains(Building& building);
+/// What is left out of rivers, and why.
+bool BuildRivers(Building& building);
 /// RCH
 bool BuildRecharge(Building& building);
 /// EVT, where an old file has brought what it needs.

@@ -121,7 +121,7 @@ std::string WhyNoModel(const CYbSEKvfGlobalBase& root) {
 
 bool Build(Building& building) {
   constexpr bool (*kFunctions[])(Building&) = {
-      BuildPeriods,  BuildDiscretization,     BuildGround, BuildBoundaries, BuildWells, BuildDrains,
+      BuildPeriods,  BuildDiscretization,     BuildGround, BuildBoundaries, BuildWells, BuildDrains, BuildRivers,
       BuildRecharge, BuildEvapotranspiration, BuildOutput, BuildSolver};
   constexpr int kBegin = 10, kEnd = 50;
   int done = 0;

@@ -13,6 +13,7 @@
 #include "subsurface/ground_properties.h"
 #include "subsurface/saturated_zone.h"
 #include "subsurface/wells.h"
+#include "surface/rivers.h"
 
 namespace tervane::modflow6 {
 
@@ -161,6 +162,15 @@ bool BuildDrains(Building& building) {
   if (const FileResult collected = Collect(sources, building.model, package); !collected.Ok())
     return building.Fail(*drains, collected.error);
   if (!package.IsEmpty()) building.model.stresses.push_back(std::move(package));
+  return true;
+}
+
+bool BuildRivers(Building& building) {
+  auto* rivers = dynamic_cast<CRiverMFKvf*>(building.root.Important(kModflowRiver));
+  if (rivers && rivers->IsDataUsedInSetup())
+    building.Tell(Fate::LeftOut, *rivers,
+                  "its network tells where rivers run, and RIV asks for their levels and what their beds let through: "
+                  "add it by hand");
   return true;
 }
 

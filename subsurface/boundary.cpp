@@ -33,6 +33,10 @@ bool MeansUndefined(double coordinate, int version) {
   return std::abs(coordinate - kUndefinedValue) < std::abs(kUndefinedValue) / 100;
 }
 
+double StepBetween(const CGeoDataBoundCondCatchmentData& traced, const GridCell& from, const GridCell& to) {
+  return traced.Geometry().cellSize * std::hypot(to.i - from.i, to.j - from.j);
+}
+
 }  // namespace
 
 CGeoDataBoundCondItemKvf::CGeoDataBoundCondItemKvf(CYbSEKvfBase* parent)
@@ -169,8 +173,7 @@ std::vector<double> LengthsAlong(const CGeoDataBoundCondCatchmentData& traced,
   // How far it is from the first cell of the trace to each cell, and once around.
   std::vector<double> far(count + 1, 0.0);
   for (std::size_t place = 0; place < count; ++place) {
-    const GridCell &from = cells[place], &to = cells[(place + 1) % count];
-    far[place + 1] = far[place] + traced.Geometry().cellSize * std::hypot(to.i - from.i, to.j - from.j);
+    far[place + 1] = far[place] + StepBetween(traced, cells[place], cells[(place + 1) % count]);
   }
   if (segments.size() == 1) lengths.front() = far.back();
   if (segments.size() < 2 || !std::ranges::all_of(segments, [](const auto& item) { return item.point.has_value(); }))
@@ -183,6 +186,23 @@ std::vector<double> LengthsAlong(const CGeoDataBoundCondCatchmentData& traced,
   for (std::size_t number = 0; number < segments.size(); ++number) {
     const double length = starts[(number + 1) % starts.size()] - starts[number];
     lengths[number] = length < 0 ? length + far.back() : length;
+  }
+  return lengths;
+}
+
+std::vector<double> LengthsInCells(const CGeoDataBoundCondCatchmentData& traced) {
+  const GridGeometry& geometry = traced.Geometry();
+  const std::vector<GridCell>& cells = traced.BoundaryCells;
+  std::vector<double> lengths(geometry.CellCount(), 0.0);
+  const auto of = [&](const GridCell& cell) -> double& {
+    return lengths[static_cast<std::size_t>(cell.j) * static_cast<std::size_t>(geometry.nx) +
+                   static_cast<std::size_t>(cell.i)];
+  };
+  for (std::size_t place = 0; place < cells.size(); ++place) {
+    const GridCell &from = cells[place], &to = cells[(place + 1) % cells.size()];
+    const double half = StepBetween(traced, from, to) / 2;
+    of(from) += half;
+    of(to) += half;
   }
   return lengths;
 }

@@ -79,5 +79,8 @@ class CGeoDataBoundCondListKvf : public CYbSEKvfListBase<CGeoDataBoundCondItemKv
 /// The length of each segment along the centres of its boundary cells, in metres; 0 where it covers none.
 std::vector<double> LengthsAlong(const CGeoDataBoundCondCatchmentData& traced,
                                  const std::vector<BoundaryItem>& segments);
+/// How much of that line belongs to each cell of the grid, in metres: half of the way to the boundary cells on both
+/// sides; 0 off the boundary.
+std::vector<double> LengthsInCells(const CGeoDataBoundCondCatchmentData& traced);
 
 }  // namespace tervane

@@ -2,8 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "modflow6/modflow6_export.h"
 
+#include <cmath>
 #include <filesystem>
 #include <functional>
+#include <map>
+#include <set>
+#include <string>
 
 #include <gmock/gmock.h>
 
@@ -250,13 +254,28 @@ TEST(Modflow6Export, EachKindOfBoundaryBecomesItsPackage) {
           Segment(4, 50, 50, "BoundaryType = 0") + "}\n");
   const ModelReader model = box.Exported();
   EXPECT_THAT(Box::Lines(model, "chd"), testing::ElementsAre("1 1 2 95 S1_1", "1 1 3 95 S1_1", "1 1 4 95 S1_1"));
-  // The line along the boundary cuts corners. 0.004 m3/s over three cells; 0.01 times 1e-4 m/s in 20 m by 100 m.
-  std::vector<std::string> cells;
+  // The line along the boundary cuts corners, so that it is longer in the cells beside them. 0.004 m3/s in all; 0.01
+  // times 1e-4 m/s in 20 m of thickness for each metre.
+  const double beside = 50 + 50 * std::sqrt(2);
+  const std::map<std::string, double> lengths{{"1 5", beside}, {"2 6", beside}, {"3 6", 100}, {"4 6", beside},
+                                              {"5 5", beside}, {"5 4", 100},    {"5 3", 100}};
+  std::set<std::string> cells;
+  double along = 0, rates = 0;
   for (const ModelReader::Row& entry : model.stresses.at("flux").at(1)) {
-    cells.push_back(fmt::format("{} {}", entry[1], entry[2]));
-    EXPECT_NEAR(std::stod(entry[3]), entry[4] == "S2_1" ? 115.2 : 172.8, 1e-3) << cells.back();
+    const std::string cell = entry[1] + " " + entry[2];
+    cells.insert(cell);
+    ASSERT_TRUE(lengths.contains(cell)) << cell;
+    const double length = lengths.at(cell), rate = std::stod(entry[3]);
+    if (entry[4] == "S3_1") {
+      EXPECT_NEAR(rate, 1.728 * length, 1e-3) << cell;
+      continue;
+    }
+    along += length;
+    rates += rate;
+    EXPECT_NEAR(rate / length, rates / along, 1e-5) << cell;
   }
-  EXPECT_THAT(cells, testing::UnorderedElementsAre("1 5", "2 6", "3 6", "4 6", "5 5", "5 4", "5 3"));
+  EXPECT_NEAR(rates, 345.6, 1e-3);
+  EXPECT_EQ(cells.size(), lengths.size());
 }
 
 TEST(Modflow6Export, ZonesInsideALayerBecomeTheirPackages) {
