@@ -63,41 +63,6 @@ std::string HeaderOf(const RasterFacts& facts, DataFileHeader& header) {
   return {};
 }
 
-/// Puts kDeleteValue for what is missing in values that are stored as they are.
-void MarkMissing(const ItemStorage& storage, std::span<float> values) {
-  // Looking first is faster than storing every value anew, and one plain loop for each condition faster than one loop
-  // with all of them.
-  if (!AreFinite(values)) {
-    for (float& value : values) value = std::isfinite(value) ? value : kDeleteValue;
-  }
-  for (const double missing : storage.missing) {
-    const auto mark = static_cast<float>(missing);
-    if (mark == kDeleteValue) continue;
-    for (float& value : values) value = value == mark ? kDeleteValue : value;
-  }
-  if (!storage.HasValidRange()) return;
-  const auto from =
-      static_cast<float>(std::max(storage.validFrom, -static_cast<double>(std::numeric_limits<float>::max())));
-  const auto to = static_cast<float>(std::min(storage.validTo, static_cast<double>(std::numeric_limits<float>::max())));
-  for (float& value : values) value = value >= from && value <= to ? value : kDeleteValue;
-}
-
-/// The number that a stored one means; a NaN when it is missing.
-double Unpacked(const ItemStorage& storage, double stored) {
-  if (storage.isUnsigned && stored < 0) {
-    stored += storage.type == NC_BYTE ? 0x1p8 : storage.type == NC_SHORT ? 0x1p16 : 0x1p32;
-  }
-  constexpr double kNone = std::numeric_limits<double>::quiet_NaN();
-  if (!std::isfinite(stored) || !(stored >= storage.validFrom && stored <= storage.validTo)) return kNone;
-  for (double missing : storage.missing) {
-    if (storage.isUnsigned && missing < 0) {
-      missing += storage.type == NC_BYTE ? 0x1p8 : storage.type == NC_SHORT ? 0x1p16 : 0x1p32;
-    }
-    if (stored == missing) return kNone;
-  }
-  return stored * storage.scale + storage.offset;
-}
-
 }  // namespace
 
 std::string_view ValueTypeText(ValueType type) {
@@ -315,7 +280,7 @@ std::string DataFile::State::ReadInOrder(const ItemStorage& storage, std::vector
                                          ProgressPart progress) const {
   bool fits = true;
   PieceReader reader(file.Id(), storage, values.size(), progress, [&](std::span<float> piece) {
-    MarkMissing(storage, piece);
+    storage.MarkMissing(piece);
     if (conversion != nullptr) fits = Convert(*conversion, piece) && fits;
   });
   if (const int status = reader.Read(0, {std::move(start), std::move(count)}, values)) return netcdf::InWords(status);
@@ -391,7 +356,7 @@ std::string DataFile::State::ReadByBoxes(const ItemStorage& storage, const DataI
     }
     BoxWalk walk(count, stride, target);
     for (const double stored : box) {
-      double value = Unpacked(storage, stored);
+      double value = storage.Unpacked(stored);
       if (conversion != nullptr) value = (*conversion)(value);
       const bool isFloat = std::abs(value) <= static_cast<double>(std::numeric_limits<float>::max());
       fits = fits && (isFloat || std::isnan(value));

@@ -546,18 +546,6 @@ class HeaderReader {
 
 }  // namespace
 
-bool ItemStorage::HasValidRange() const { return std::isfinite(validFrom) || std::isfinite(validTo); }
-
-bool ItemStorage::IsInOrder() const {
-  int last = -1;
-  for (const int place : {time, z, y, x}) {
-    if (place < 0) continue;
-    if (place < last) return false;
-    last = place;
-  }
-  return !isXTurned && !isZTurned;
-}
-
 std::string SetUnit(DataItem& item, std::string unitText, std::optional<int> unitKey) {
   item.unitText = std::move(unitText);
   const Unit* unit = FindUnit(unitKey.value_or(-1));

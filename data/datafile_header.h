@@ -8,6 +8,7 @@
 #include <cstdint>
 #include <limits>
 #include <optional>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -39,6 +40,10 @@ struct ItemStorage {
   bool HasValidRange() const;
   /// True when the values stand in the order of the caller's buffer, but for turned rows.
   bool IsInOrder() const;
+  /// Puts kDeleteValue for what is missing in values that are stored as they are.
+  void MarkMissing(std::span<float> values) const;
+  /// The number that a stored one means; a NaN when it is missing.
+  double Unpacked(double stored) const;
 };
 
 struct DataFileHeader {

@@ -3,9 +3,11 @@
 #include "results/point_comparison.h"
 
 #include <cmath>
+#include <set>
 
 #include <fmt/format.h>
 
+#include "data/series_block.h"
 #include "platform/paths.h"
 
 namespace tervane {
@@ -40,9 +42,10 @@ ComparedUnit UnitOfComparison(const DataItem& item, const DisplayUnits& units) {
   return {unit.scale, std::string(unit.abbreviation)};
 }
 
-/// Reads a series in the unit. "" or why not.
-std::string ReadSeries(const DataFile& file, int number, const ComparedUnit& unit, PointSeries& series,
-                       ProgressPart progress) {
+/// Takes the values of a series, which `read` gives in the file's unit, in the unit. "" or why not.
+template <class Read>
+std::string TakeSeries(const DataFile& file, int number, const ComparedUnit& unit, PointSeries& series,
+                       const Read& read) {
   const DataItem& item = ItemOf(file, number);
   std::optional<UnitConversion> conversion;
   if (unit.scale && item.scale) conversion = ConversionBetween(*item.scale, *unit.scale);
@@ -53,11 +56,7 @@ std::string ReadSeries(const DataFile& file, int number, const ComparedUnit& uni
   series.valueType = item.valueType;
   series.stamps = file.Time().stamps;
   if (file.Time().begin) series.begin = file.Time().begin->SecondsSinceEpoch();
-  series.values.resize(file.Time().steps);
-  if (const std::string error = file.Read({number, 0, file.Time().steps, {}}, series.values, {}, progress);
-      !error.empty())
-    return error;
-  if (!conversion) return {};
+  if (const std::string error = read(series.values); !error.empty() || !conversion) return error;
   for (float& value : series.values)
     if (value != kDeleteValue) value = static_cast<float>((*conversion)(static_cast<double>(value)));
   return {};
@@ -74,13 +73,43 @@ PointComparer::PointComparer(const ComparedPeriod& period, const DisplayUnits& u
 std::string PointComparer::OpenFile::Open(const std::string& wanted) {
   if (path == wanted) return {};
   path.reset();
+  together.clear();
   file = DataFile();
   std::string error = file.Open(wanted);
   if (error.empty()) path = wanted;
   return error;
 }
 
-PointComparison PointComparer::Compare(const DetailedPoint& point, ProgressPart progress) {
+std::string PointComparer::OpenFile::Read(std::span<const DetailedPoint> coming, Place place,
+                                          std::vector<float>& values, ProgressPart progress) {
+  const int item = (coming.front().*place).item;
+  const std::size_t steps = file.Time().steps;
+  if (const auto found = together.find(item); found != together.end()) {
+    values = found->second;
+    return {};
+  }
+  // One after the other, few series are as soon read. Many are read in parts that leave room for others in memory.
+  constexpr std::size_t kFew = 4, kMostValues = std::size_t{1} << 24;
+  std::set<int> wanted;
+  for (const DetailedPoint& point : coming) {
+    if ((point.*place).path != path || (wanted.size() + 1) * steps > kMostValues) break;
+    if (point.includesObserved && WhyNoSeries(file, (point.*place).item).empty()) wanted.insert((point.*place).item);
+  }
+  std::vector<std::vector<float>> series;
+  const std::vector<int> items(wanted.begin(), wanted.end());
+  // What is wrong with one of them is told by itself.
+  if (items.size() > kFew && ReadSeriesTogether(*path, items, series, progress).empty()) {
+    together.clear();
+    for (std::size_t i = 0; i < items.size(); ++i) together.emplace(items[i], std::move(series[i]));
+    values = together.at(item);
+    return {};
+  }
+  values.resize(steps);
+  return file.Read({item, 0, steps, {}}, values, {}, progress);
+}
+
+PointComparison PointComparer::CompareFirst(std::span<const DetailedPoint> coming, ProgressPart progress) {
+  const DetailedPoint& point = coming.front();
   PointComparison comparison;
   comparison.point = point;
   std::string& problem = comparison.problem;
@@ -94,9 +123,12 @@ PointComparison PointComparer::Compare(const DetailedPoint& point, ProgressPart 
 
   const ComparedUnit unit = UnitOfComparison(ItemOf(simulated, point.simulated.item), units_);
   comparison.unit = unit.text;
-  problem = ReadSeries(simulated, point.simulated.item, unit, comparison.simulated, progress.Part(0, 0.5));
-  if (problem.empty())
-    problem = ReadSeries(observed, point.observed.item, unit, comparison.observed, progress.Part(0.5, 1));
+  const auto take = [&](OpenFile& open, Place place, PointSeries& series, ProgressPart part) {
+    return TakeSeries(open.file, (point.*place).item, unit, series,
+                      [&](std::vector<float>& values) { return open.Read(coming, place, values, part); });
+  };
+  problem = take(simulated_, &DetailedPoint::simulated, comparison.simulated, progress.Part(0, 0.5));
+  if (problem.empty()) problem = take(observed_, &DetailedPoint::observed, comparison.observed, progress.Part(0.5, 1));
   if (!problem.empty()) return comparison;
   comparison.pairs = PairsOf(comparison.simulated.View(), comparison.observed.View(), start_, end_);
   comparison.figures = StatisticsOf(comparison.pairs);

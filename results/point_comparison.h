@@ -4,7 +4,9 @@
 // A point's simulated series held against its observed one.
 #pragma once
 
+#include <map>
 #include <optional>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -44,21 +46,32 @@ struct PointComparison {
   bool isUnreadable = false;  ///< A file could not be opened.
 };
 
-/// Compares points one after the other. A file stays open while the next point names the same one. Figures are in the
-/// user's unit of what was simulated.
+/// Compares points one after the other. A file stays open while the next point names the same one, and many series of
+/// it are read together. Figures are in the user's unit of what was simulated.
 class PointComparer {
  public:
   PointComparer(const ComparedPeriod& period, const DisplayUnits& units);
 
-  PointComparison Compare(const DetailedPoint& point, ProgressPart progress = {});
+  PointComparison Compare(const DetailedPoint& point, ProgressPart progress = {}) {
+    return CompareFirst({&point, 1}, progress);
+  }
+  /// Compares the first of those that are to be compared one after the other.
+  PointComparison CompareFirst(std::span<const DetailedPoint> coming, ProgressPart progress = {});
 
  private:
+  /// Where a point's series stands.
+  using Place = SeriesPlace DetailedPoint::*;
+
   struct OpenFile {
     DataFile file;
     std::optional<std::string> path;
+    std::map<int, std::vector<float>> together;  ///< Series by their items that were read ahead.
 
     /// "" or why it cannot be opened.
     std::string Open(const std::string& wanted);
+    /// The values of the first point's series in the file's unit. "" or why not.
+    std::string Read(std::span<const DetailedPoint> coming, Place place, std::vector<float>& values,
+                     ProgressPart progress);
   };
 
   std::int64_t start_ = 0, end_ = -1;  ///< Seconds since 1970-01-01.

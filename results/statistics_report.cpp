@@ -5,6 +5,7 @@
 #include <cmath>
 #include <fstream>
 #include <iterator>
+#include <span>
 
 #include <fmt/format.h>
 
@@ -107,7 +108,8 @@ FileResult ComputeStatistics(const std::vector<DetailedPoint>& points, const Com
     if (progress.IsCancelled()) return {kCancelled, {}};
     progress.Report(begin);
     if (!points[i].includesObserved) continue;
-    PointComparison comparison = comparer.Compare(points[i], progress.Part(begin, static_cast<double>(i + 1) / count));
+    PointComparison comparison =
+        comparer.CompareFirst(std::span(points).subspan(i), progress.Part(begin, static_cast<double>(i + 1) / count));
     if (progress.IsCancelled()) return {kCancelled, {}};
     if (comparison.isUnreadable) {
       table.stopped = comparison.problem;

@@ -183,6 +183,39 @@ TEST_F(StatisticsReport, WhatCannotBeComparedIsToldAndHasNoFigures) {
   EXPECT_THAT(table.rows[3].problem, HasSubstr("no observed value"));
 }
 
+TEST_F(StatisticsReport, ManySeriesOfAFileAreReadAsEachByItself) {
+  // More than are read one by one, with a gap, and one point that comes twice.
+  std::vector<std::vector<float>> simulated, measured;
+  for (int item = 0; item < 12; ++item) {
+    simulated.emplace_back();
+    for (int day = 0; day < kDays; ++day)
+      simulated.back().push_back(static_cast<float>(day * item % 5) + 0.25F * static_cast<float>(item));
+    measured.emplace_back(simulated.back().rbegin(), simulated.back().rend());
+    measured.back()[static_cast<std::size_t>(item % kDays)] = kDeleteValue;
+  }
+  WriteSeries(folder.File("sim.nds0"), quantity::kElevation, simulated);
+  WriteSeries(folder.File("obs.nds0"), quantity::kElevation, measured);
+  for (int i = 0; i < 13; ++i) {
+    DetailedPoint& point = points.emplace_back();
+    point.simulated = {folder.File("sim.nds0"), i < 12 ? 12 - i : 3};
+    point.observed = {folder.File("obs.nds0"), 1 + i * 5 % 12};
+    point.includesObserved = i != 4;
+  }
+  points[6].simulated.item = 77;
+  test::Require(ComputeStatistics(points, kPeriod, units, table).error);
+  ASSERT_EQ(table.rows.size(), 12);
+  PointComparer comparer(kPeriod, units);
+  for (const PointStatistics& row : table.rows) {
+    const PointComparison alone = comparer.Compare(row.point);
+    EXPECT_EQ(row.problem, alone.problem);
+    EXPECT_EQ(row.figures.pairs, alone.figures.pairs);
+    EXPECT_EQ(row.figures.meanError, alone.figures.meanError);
+    EXPECT_EQ(row.figures.correlation, alone.figures.correlation);
+  }
+  EXPECT_THAT(table.rows[5].problem, HasSubstr("no item 77"));
+  EXPECT_EQ(table.rows[0].figures.pairs, 6);
+}
+
 TEST_F(StatisticsReport, CanBeStopped) {
   WriteBothSeries();
   test::Require(ReadDetailedPoints(WriteReport({"", ""}), points).error);
