@@ -11,6 +11,7 @@
 #include <QPainter>
 #include <QPointer>
 #include <QToolTip>
+#include <algorithm>
 
 #include "shell/page/table_view.h"
 #include "shell/widgets/date_entry.h"
@@ -20,16 +21,32 @@
 
 namespace tervane {
 
+namespace {
+
+/// The texts of choices, by which each is found: those that several share have the value behind them.
+QStringList NamesOf(const CellChoices& choices) {
+  QStringList names;
+  for (const CellChoice& choice : choices) {
+    const auto isSame = [&](const CellChoice& other) { return other.text == choice.text; };
+    const bool isAlone = std::ranges::count_if(choices, isSame) == 1;
+    names << (isAlone ? Translated(choice.text) : Translated(choice.text) + " (" + ToQt(choice.value) + ")");
+  }
+  return names;
+}
+
+}  // namespace
+
 // ---- Editors
 
 QWidget* CellDelegate::createEditor(QWidget* parent, const QStyleOptionViewItem&, const QModelIndex& index) const {
   index_ = index;
   const CellKind kind = KindAt(index);
-  if (kind == CellKind::Choice) return NewChoiceList(parent, index);
+  if (kind == CellKind::Choice && !IsFoundByName(index)) return NewChoiceList(parent, index);
   auto* edit = new QLineEdit(parent);
   edit->setFrame(false);
   if (kind == CellKind::File) AddBrowseButton(edit, index);
   if (kind == CellKind::Date) AddCalendarButton(edit);
+  if (kind == CellKind::Choice) AddNames(edit, index);
   if (kind == CellKind::Text && model_.Table().Column(index.column() + 1)->offers) AddOffers(edit, index);
   return edit;
 }
@@ -44,6 +61,38 @@ QWidget* CellDelegate::NewChoiceList(QWidget* parent, const QModelIndex& index) 
     emit self->closeEditor(list);
   });
   return list;
+}
+
+bool CellDelegate::IsFoundByName(const QModelIndex& index) const {
+  constexpr std::size_t kMostInList = 12;  // more are not seen at once
+  return KindAt(index) == CellKind::Choice &&
+         model_.Table().Choices(index.row() + 1, index.column() + 1).size() > kMostInList;
+}
+
+void CellDelegate::AddNames(QLineEdit* edit, const QModelIndex& index) const {
+  const QStringList names = NamesOf(model_.Table().Choices(index.row() + 1, index.column() + 1));
+  OfferTexts(
+      *edit, [names] { return names; },
+      [this, edit] {
+        auto* self = const_cast<CellDelegate*>(this);
+        if (self->Take(edit)) self->Close(edit);
+      });
+}
+
+std::optional<QString> CellDelegate::ValueOf(const QModelIndex& index, const QString& text) const {
+  if (!IsFoundByName(index)) return text;
+  // As it stands there, which a choice that is offered no longer may do.
+  if (text == index.data(Qt::DisplayRole).toString()) return index.data(Qt::EditRole).toString();
+  const CellChoices choices = model_.Table().Choices(index.row() + 1, index.column() + 1);
+  const QStringList names = NamesOf(choices);
+  const auto isMeant = [&](const QString& name) { return name.compare(text, Qt::CaseInsensitive) == 0; };
+  auto found = std::ranges::find_if(names, isMeant);
+  if (found == names.end()) {
+    const QStringList holding = names.filter(text, Qt::CaseInsensitive);
+    if (text.isEmpty() || holding.size() != 1) return std::nullopt;
+    found = std::ranges::find(names, holding.front());
+  }
+  return ToQt(choices[static_cast<std::size_t>(found - names.begin())].value);
 }
 
 void CellDelegate::AddBrowseButton(QLineEdit* edit, const QModelIndex& index) const {
@@ -89,7 +138,7 @@ void CellDelegate::setEditorData(QWidget* editor, const QModelIndex& index) cons
   if (auto* list = qobject_cast<QComboBox*>(editor))
     list->setCurrentIndex(list->findData(value));
   else if (auto* edit = qobject_cast<QLineEdit*>(editor); edit && !edit->property("refused").toBool())
-    edit->setText(value);
+    edit->setText(IsFoundByName(index) ? index.data(Qt::DisplayRole).toString() : value);
 }
 
 void CellDelegate::setModelData(QWidget* editor, QAbstractItemModel* model, const QModelIndex& index) const {
@@ -97,7 +146,7 @@ void CellDelegate::setModelData(QWidget* editor, QAbstractItemModel* model, cons
   if (list && list->currentIndex() >= 0)
     model->setData(index, list->currentData(), Qt::EditRole);
   else if (const auto* edit = qobject_cast<QLineEdit*>(editor))
-    model->setData(index, edit->text(), Qt::EditRole);
+    if (const auto value = ValueOf(index, edit->text())) model->setData(index, *value, Qt::EditRole);
 }
 
 void CellDelegate::updateEditorGeometry(QWidget* editor, const QStyleOptionViewItem& option,
@@ -114,17 +163,23 @@ void CellDelegate::updateEditorGeometry(QWidget* editor, const QStyleOptionViewI
 }
 
 bool CellDelegate::Take(QLineEdit* edit) {
-  if (!index_.isValid() || edit->text() == index_.data(Qt::EditRole).toString()) return true;
+  if (!index_.isValid()) return true;
+  const auto value = ValueOf(index_, edit->text());
+  if (value == index_.data(Qt::EditRole).toString()) return true;
   const QPointer<QLineEdit> stays(edit);
-  if (model_.setData(index_, edit->text(), Qt::EditRole) || !stays) return true;
+  if (value && (model_.setData(index_, *value, Qt::EditRole) || !stays)) return true;
+  ShowRefusal(edit, value ? model_.Refusal() : TableView::tr("one of the list was expected"));
+  return false;
+}
+
+void CellDelegate::ShowRefusal(QLineEdit* edit, const QString& expected) const {
   edit->setProperty("refused", true);
   QPalette palette;
   palette.setColor(QPalette::Text, Theme::Get().ErrorColor());
   edit->setPalette(palette);
-  const QString message = TableView::tr("Not taken: %1.").arg(model_.Refusal());
+  const QString message = TableView::tr("Not taken: %1.").arg(expected);
   edit->setToolTip(message);
   QToolTip::showText(edit->mapToGlobal(QPoint(0, edit->height())), message, edit);
-  return false;
 }
 
 void CellDelegate::Close(QWidget* editor) { emit closeEditor(editor, QAbstractItemDelegate::NoHint); }

@@ -5,6 +5,7 @@
 #include <QKeyEvent>
 #include <QPersistentModelIndex>
 #include <QStyledItemDelegate>
+#include <optional>
 
 #include "shell/page/table_model.h"
 
@@ -42,11 +43,17 @@ class CellDelegate : public QStyledItemDelegate {
   CellKind KindAt(const QModelIndex& index) const { return model_.Table().Kind(index.row() + 1, index.column() + 1); }
   bool IsGrey(const QModelIndex& index) const { return model_.Table().IsGrey(index.row() + 1, index.column() + 1); }
   QWidget* NewChoiceList(QWidget* parent, const QModelIndex& index) const;
+  /// A choice among so many that one is found by its name, in a line that offers those that hold what is typed.
+  bool IsFoundByName(const QModelIndex& index) const;
+  void AddNames(QLineEdit* edit, const QModelIndex& index) const;
+  /// What the cell stores for a text of its editor; nothing where that means no choice, or several.
+  std::optional<QString> ValueOf(const QModelIndex& index, const QString& text) const;
   void AddBrowseButton(QLineEdit* edit, const QModelIndex& index) const;
   void AddCalendarButton(QLineEdit* edit) const;
   void AddOffers(QLineEdit* edit, const QModelIndex& index) const;
   /// Hands the text of a line over; false when it was refused, and then stays in it.
   bool Take(QLineEdit* edit);
+  void ShowRefusal(QLineEdit* edit, const QString& expected) const;
   void Close(QWidget* editor);
 
   TableModel& model_;

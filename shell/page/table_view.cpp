@@ -6,14 +6,17 @@
 #include <QApplication>
 #include <QClipboard>
 #include <QComboBox>
+#include <QDropEvent>
 #include <QHBoxLayout>
 #include <QHeaderView>
 #include <QKeyEvent>
 #include <QLabel>
 #include <QLineEdit>
 #include <QMenu>
+#include <QMimeData>
 #include <QRegularExpression>
 #include <QToolButton>
+#include <QUrl>
 #include <algorithm>
 
 #include "shell/page/cell_delegate.h"
@@ -122,6 +125,8 @@ void TableView::MakeView() {
   view_->setTabKeyNavigation(false);  // the keys are our own
   view_->setMinimumHeight(theme.Scaled(140));
   view_->installEventFilter(this);
+  view_->viewport()->setAcceptDrops(true);
+  view_->viewport()->installEventFilter(this);
   view_->setContextMenuPolicy(Qt::ActionsContextMenu);
   const int rowHeight = view_->fontMetrics().height() + theme.Scaled(8);
   view_->verticalHeader()->setDefaultSectionSize(rowHeight);
@@ -148,7 +153,7 @@ void TableView::MakeActions() {
   action(tr("&Paste"), QKeySequence::Paste, &TableView::Paste);
   action(tr("&Fill Down"), QKeySequence(Qt::CTRL | Qt::Key_D), &TableView::FillDown);
   if (const std::string& toAll = control_.table->ToAllRowsCommand(); !toAll.empty())
-    action(Translated(toAll), QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_D), &TableView::FillAll);
+    action(Translated(toAll), QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_D), &TableView::FillAll);
   action(tr("C&lear"), QKeySequence(Qt::Key_Delete), &TableView::ClearCells);
 }
 
@@ -332,10 +337,14 @@ void TableView::FillDown() {
 }
 
 void TableView::FillAll() {
-  const auto cells = Selected();
+  auto cells = Selected();
   if (!cells) return;
+  // Of several rows that are selected the current one is taken, wherever among them it stands.
+  const int current = view_->currentIndex().row() + 1;
+  if (current >= cells->firstRow && current <= cells->lastRow) cells->firstRow = current;
+  cells->lastRow = cells->firstRow;
   const CellsResult result = page_.FillAll(control_, *cells);
-  ShowResult(result, tr("Cells filled: %1").arg(result.taken));
+  ShowResult(result, tr("Cells filled: %1, with the values of row %2").arg(result.taken).arg(cells->firstRow));
 }
 
 void TableView::ClearCells() {
@@ -409,7 +418,37 @@ bool TableView::TakeKey(const QKeyEvent& keys) {
   }
 }
 
+QModelIndex TableView::FileCellAt(QPoint place) const {
+  const QModelIndex at = view_->indexAt(place);
+  if (!at.isValid()) return {};
+  const TableForm& table = *control_.table;
+  int column = at.column() + 1;
+  while (column > 1 && table.Column(column)->IsButton()) --column;
+  const bool isFile = table.Kind(at.row() + 1, column) == CellKind::File && !table.IsReadOnly(at.row() + 1, column);
+  return isFile && control_.IsEnabled() ? model_->index(at.row(), column - 1) : QModelIndex();
+}
+
+bool TableView::TakeDraggedFile(QDropEvent& event) {
+  const QList<QUrl> urls = event.mimeData()->urls();
+  if (urls.size() != 1 || !urls.front().isLocalFile()) return false;
+  if (event.type() == QEvent::DragEnter) {
+    // It may come in over any cell, and is told of the others only then.
+    event.acceptProposedAction();
+    return true;
+  }
+  const QModelIndex cell = FileCellAt(event.position().toPoint());
+  event.setAccepted(cell.isValid());
+  if (!cell.isValid() || event.type() != QEvent::Drop) return true;
+  view_->setCurrentIndex(cell);
+  if (!model_->setData(cell, urls.front().toLocalFile(), Qt::EditRole))
+    page_.Outside().ShowMessage(FromQt(tr("Not taken: %1.").arg(model_->Refusal())), Host::Icon::Warning);
+  return true;
+}
+
 bool TableView::eventFilter(QObject* watched, QEvent* event) {
+  const bool isDrag =
+      event->type() == QEvent::DragEnter || event->type() == QEvent::DragMove || event->type() == QEvent::Drop;
+  if (watched == view_->viewport() && isDrag) return TakeDraggedFile(static_cast<QDropEvent&>(*event));
   const bool isPress = event->type() == QEvent::KeyPress || event->type() == QEvent::ShortcutOverride;
   if (watched == view_ && (isPress || event->type() == QEvent::KeyRelease)) {
     const auto* keys = static_cast<QKeyEvent*>(event);

@@ -8,6 +8,7 @@
 
 #include "shell/page/table_model.h"
 
+class QDropEvent;
 class QLabel;
 class QLineEdit;
 class QToolButton;
@@ -58,6 +59,10 @@ class TableView : public QWidget {
   void ConnectView();
   void MakeActions();
   void ChangeRowOfCurrentCell(RowAction action);
+  /// A file that is dragged over the cells; true where it is dealt with.
+  bool TakeDraggedFile(QDropEvent& event);
+  /// The cell with a file of which a place tells: the cell there, or the one on the left of the buttons there.
+  QModelIndex FileCellAt(QPoint place) const;
   /// Makes the cell the current one of the row that is current in the form.
   void FollowCurrentRow();
   /// The first column in which something can be typed, from 0.

@@ -32,6 +32,7 @@ class TablePage : public CYbSEDlgBase {
   std::vector<TableRow> rows;
   bool withX = true;
   bool enabled = true;
+  CellChoices processes{{1110, "Porosity"}, {1120, "Bulk density"}};
   std::vector<std::string> pressed;
   std::shared_ptr<TableOf<TableRow>> table;
   const Control& TableControl() const { return *Form().Controls().front(); }
@@ -57,6 +58,7 @@ class TablePage : public CYbSEDlgBase {
     using Row = TableRow;
     table = std::make_shared<TableOf<Row>>(rows);
     table->ItemName("Season");
+    table->OfferToAllRows("Apply to All Seasons");
     table->RowHeads([](Row& row) { return row.name.empty() ? "?" : row.name.substr(0, 2); });
     table->Value("Name", &Row::name).Width(90).Hint(kDataChanged | kTreeRebuilt).Offers([](Row& row) {
       return std::vector<std::string>{row.days < 100 ? "Month" : "Half-year", "Winter"};
@@ -68,7 +70,7 @@ class TablePage : public CYbSEDlgBase {
             "End", [] { return CYbDateTime(2000, 1, 1); },
             [](const CYbDateTime& end, Row& row) { return end + CYbDateTimeSpan::Days(row.days); })
         .Width(150);
-    table->Choice("Process", &Row::process, {{1110, "Porosity"}, {1120, "Bulk density"}}).Width(110);
+    table->Choice("Process", &Row::process, processes).Width(110);
     table
         ->Choice("Species", &Row::species,
                  [](Row& row) {

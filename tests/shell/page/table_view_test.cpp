@@ -6,10 +6,13 @@
 #include <QCalendarWidget>
 #include <QComboBox>
 #include <QCompleter>
+#include <QDropEvent>
 #include <QHeaderView>
+#include <QMimeData>
 #include <QRegularExpression>
 #include <QTableView>
 #include <QToolButton>
+#include <QUrl>
 #include <algorithm>
 
 #include <gmock/gmock.h>
@@ -150,8 +153,10 @@ enum Column { kName = 1, kStart, kDays, kEnd, kProcess, kSpecies, kX, kPick, kHa
 /// The page with every kind of cell, worked as a user works it.
 class ShownTable {
  public:
-  explicit ShownTable(std::vector<test::TableRow> rows = test::TablePage::ThreeRows(), QSize size = {1400, 640}) {
+  explicit ShownTable(std::vector<test::TableRow> rows = test::TablePage::ThreeRows(), QSize size = {1400, 640},
+                      const CellChoices& furtherProcesses = {}) {
     page_.rows = std::move(rows);
+    page_.processes.insert(page_.processes.end(), furtherProcesses.begin(), furtherProcesses.end());
     page_.Initialize();
     shown_ = std::make_unique<PageView>(page_);
     page_.FollowItself([this] { shown_->Sync(); }, [this] { shown_->Sync(); });
@@ -295,6 +300,18 @@ TEST(TableView, ButtonsActOnTheRowOfTheCurrentCellWhereNoRowIsSelected) {
   EXPECT_EQ(table.Current().first, 2);
 }
 
+TEST(TableView, TheCurrentRowOfThoseSelectedIsAppliedToAllRows) {
+  ShownTable table;
+  table.GoTo(2, kDays);
+  const auto index = [&](int row, int column) { return table.Cells().model()->index(row - 1, column - 1); };
+  table.Cells().selectionModel()->select(QItemSelection(index(1, kDays), index(3, kProcess - 1)),
+                                         QItemSelectionModel::ClearAndSelect);
+  table.Press(Qt::Key_D, Qt::ControlModifier | Qt::AltModifier);
+  for (const int row : {1, 2, 3}) EXPECT_EQ(table.Row(row).days, 365.0 / 3);
+  EXPECT_EQ(table.Row(1).process, 1110);
+  EXPECT_EQ(table.Names(), "Spring Summer Autumn ");
+}
+
 TEST(TableView, ButtonsInCellsArePressedByMouseAndKeyboard) {
   ShownTable table;
   table.Click(2, kEdit);
@@ -361,6 +378,72 @@ TEST(TableView, AChoiceOffersWhatItsRowHas) {
   EXPECT_EQ(list->currentText(), "Bulk density");
   table.Type("p");
   EXPECT_EQ(table.Row(2).process, 1110);
+}
+
+TEST(TableView, AChoiceOfManyIsFoundByItsNameWhileTyping) {
+  CellChoices rates;
+  for (int code = 1; code <= 14; ++code) rates.push_back({code, "Rate " + std::to_string(code)});
+  rates.push_back({77, "Rate 14"});
+  ShownTable table(test::TablePage::ThreeRows(), {1400, 640}, rates);
+  const auto open = [&] {
+    QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+    table.GoTo(1, kProcess);
+    table.Press(Qt::Key_F2);
+    return table.Cells().findChild<QLineEdit*>();
+  };
+  QLineEdit* edit = open();
+  ASSERT_TRUE(edit && edit->completer());
+  EXPECT_EQ(edit->text(), "Porosity");
+  edit->selectAll();
+  table.Type("E 1");
+  EXPECT_EQ(edit->completer()->completionCount(), 7) << "1, 10 to 13, and 14 twice";
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Row(1).process, 1110) << "that means none of them";
+  EXPECT_TRUE(edit->isVisible());
+  table.Type("2");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Row(1).process, 12);
+  edit = open();
+  edit->selectAll();
+  table.Type("rate 1");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Row(1).process, 1) << "a whole name, though others begin with it";
+  // Of two with one name each can be told.
+  edit = open();
+  edit->completer()->setCompletionPrefix("14");
+  EXPECT_EQ(edit->completer()->completionCount(), 2);
+  emit edit->completer()->activated(QString("Rate 14 (77)"));
+  EXPECT_EQ(table.Row(1).process, 77);
+  // As any other cell, it opens by the first letter.
+  QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+  table.GoTo(1, kProcess);
+  table.Type("bulk");
+  table.Press(Qt::Key_Return);
+  EXPECT_EQ(table.Row(1).process, 1120);
+}
+
+TEST(TableView, AFileIsDroppedOnItsCellOrOnAButtonBesideIt) {
+  ShownTable table;
+  const auto drop = [&](int row, int column, const QList<QUrl>& urls) {
+    const QModelIndex index = table.Cells().model()->index(row - 1, column - 1);
+    const QPointF place = table.Cells().visualRect(index).center();
+    QMimeData dragged;
+    dragged.setUrls(urls);
+    QDragEnterEvent enter(place.toPoint(), Qt::CopyAction, &dragged, Qt::LeftButton, Qt::NoModifier);
+    QApplication::sendEvent(table.Cells().viewport(), &enter);
+    QDropEvent event(place, Qt::CopyAction, &dragged, Qt::LeftButton, Qt::NoModifier);
+    QApplication::sendEvent(table.Cells().viewport(), &event);
+    return event.isAccepted();
+  };
+  const QList<QUrl> file{QUrl::fromLocalFile("/data/flow.nds0")};
+  EXPECT_TRUE(drop(2, kEdit, file));
+  EXPECT_EQ(table.Row(2).file.Absolute(), "/data/flow.nds0");
+  EXPECT_TRUE(drop(2, kFile, {QUrl::fromLocalFile("/data/level.nds0")}));
+  EXPECT_EQ(table.Row(2).file.Absolute(), "/data/level.nds0");
+  EXPECT_FALSE(drop(1, kBrowse, file)) << "its file is not asked for";
+  EXPECT_FALSE(drop(2, kPick, file)) << "this button is that of a place";
+  EXPECT_FALSE(drop(2, kFile, file + file));
+  EXPECT_EQ(table.Row(2).file.Absolute(), "/data/level.nds0");
 }
 
 TEST(TableView, ColumnsComeAndGoAndHeadsGoOverThem) {
