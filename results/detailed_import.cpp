@@ -48,6 +48,8 @@ bool TakeField(const KeyInfo& key, std::string_view field) {
 
 /// Why a line gives no point; empty where the item has taken it.
 std::string TakeImportLine(DetailedSeriesItem& item, std::string_view line, const std::string& setupFolder) {
+  // A setup could not be saved with it.
+  if (FirstInvalidUtf8(line)) return "it is no text in UTF-8: save the file in that form";
   std::vector<KeyInfo> keys;
   item.DescribeKeys(keys);
   const ImportFields fields = ImportFieldsOf(line);
@@ -70,10 +72,15 @@ DetailedImport ImportDetailedPoints(CYbSEKvfListBaseInterface& list, const std::
                                     const std::string& setupFolder, std::string_view format) {
   FileContent content;
   if (const FileResult read = ReadWholeFile(path, content); !read.Ok()) return {0, 0, read.error};
-  if (const std::string why = WhyNoText(content.Text()); !why.empty())
+  return ImportDetailedText(list, content.Text(), path, setupFolder, format);
+}
+
+DetailedImport ImportDetailedText(CYbSEKvfListBaseInterface& list, std::string_view text, const std::string& path,
+                                  const std::string& setupFolder, std::string_view format) {
+  if (const std::string why = WhyNoText(text); !why.empty())
     return {0, 0, fmt::format("{}\n\n{}: {}", format, path, why)};
   DetailedImport outcome;
-  LineReader lines(content.Text());
+  LineReader lines(text);
   for (std::string_view line; lines.Next(line);) {
     list.AddItemNode();
     auto& item = static_cast<DetailedSeriesItem&>(*list.GetItemNode(list.GetItemCount()));

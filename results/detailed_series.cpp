@@ -26,8 +26,14 @@ constexpr std::string_view kRiverFormat =
 
 // ---- Points
 
+std::optional<FileUse> ObservedFile::UsedFile() const {
+  std::optional<FileUse> use = CTvnData0DFile::UsedFile();
+  if (use) use->isOverTime = true;
+  return use;
+}
+
 DetailedSeriesItem::DetailedSeriesItem(std::string title, CYbSEKvfBase* list)
-    : NamedItemKvf(std::move(title), "Item_%d", {}, list), observed_(NewChild<CTvnData0DFile>("TIME_SERIES_FILE")) {
+    : NamedItemKvf(std::move(title), "Item_%d", {}, list), observed_(NewChild<ObservedFile>("TIME_SERIES_FILE")) {
   observed_->UsedWhen(On(InclObserved));
 }
 

@@ -5,6 +5,7 @@
 // there is one.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -15,6 +16,14 @@
 namespace tervane {
 
 class CCatchmentKvf;
+
+/// A file of observed values, which is told how it lies to the time of the simulation and need not cover it.
+class ObservedFile : public CTvnData0DFile {
+ public:
+  using CTvnData0DFile::CTvnData0DFile;
+
+  std::optional<FileUse> UsedFile() const override;
+};
 
 /// A point of either kind. What it is at is told by its class, in front of the observed values.
 class DetailedSeriesItem : public NamedItemKvf {
@@ -81,6 +90,9 @@ struct DetailedImport {
 /// message for a line with too few fields begins with `format`. The file's names stand as they are, in `setupFolder`.
 DetailedImport ImportDetailedPoints(CYbSEKvfListBaseInterface& list, const std::string& path,
                                     const std::string& setupFolder, std::string_view format);
+/// The same of the text of such a file.
+DetailedImport ImportDetailedText(CYbSEKvfListBaseInterface& list, std::string_view text, const std::string& path,
+                                  const std::string& setupFolder, std::string_view format);
 
 /// What both lists have.
 template <class Item>

@@ -362,6 +362,11 @@ void CoverageBuilder::Conclude(CoverageRow& row) {
   if (row.problem.empty() && row.file.use.kind == FileUse::Kind::Points && board_.request.domain.geometry)
     std::ranges::move(FindMisplacement(LocateFile(row.file.use), *board_.request.domain.geometry),
                       std::back_inserter(row.remarks));
+  const std::optional<TimeSpan>& simulation = board_.request.simulation;
+  const bool isApart = row.file.use.isOverTime && row.period && simulation &&
+                       (row.period->end < simulation->start || row.period->start > simulation->end);
+  // Validation tells it of what must cover the simulation.
+  if (isApart && row.remarks.empty()) add(Severity::Warning, "It has no values in the time of the simulation");
   constexpr std::size_t kMostGaps = 5;
   for (std::size_t i = 0; i < std::min(row.gaps.size(), kMostGaps); ++i)
     add(Severity::Warning, fmt::format("No values from {} to {}", DateInWords(DateAt(row.gaps[i].start)),

@@ -71,7 +71,9 @@ void DescribeStoring(PageForm& form, CStoringResultsKvf& n) {
   form.Check("Only store Hot start data at the end of simulation", n.OnlyStoreHotDataAtEndOfSimulation)
       .EnabledWhen(storesHotStart);
   form.Number("Hot start storing interval:", n.HotstartStoringTimestep_Hrs)
+      .Unit("")
       .EnabledWhen(storesHotStart && !On(n.OnlyStoreHotDataAtEndOfSimulation));
+  form.Label("(hrs)").Beside().EnabledWhen(storesHotStart);
   DescribeWaterMovement(form, n);
   DescribeWaterQuality(form, n);
 }

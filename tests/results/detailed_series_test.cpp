@@ -61,6 +61,12 @@ TEST(DetailedSeries, AnImportTakesLinesUntilOneIsWrong) {
         "Import file must be a tab delimited text file with 9 columns:\nName<TAB>Datatypenumber<TAB>Group<TAB>");
     EXPECT_EQ(hasFormat, one.result == 0) << one.what;
   }
+  TempFolder folder;
+  Lists latin;
+  const DetailedImport noUtf8 =
+      latin.points.ImportFile(folder.Write("latin.txt", "M\xFChle\t61\t1\t1\t2\t3\t0\tp\t1\n"), "/setups");
+  EXPECT_EQ(noUtf8.added, 0) << "a setup could not be saved with its name";
+  EXPECT_THAT(noUtf8.message, HasSubstr("line 1: it is no text in UTF-8"));
   Lists lists;
   const DetailedImport missing = lists.points.ImportFile("/no/such.txt", "/setups");
   EXPECT_EQ(missing.result, 0);

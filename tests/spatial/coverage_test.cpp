@@ -10,6 +10,8 @@
 #include "data/datafile_writer.h"
 #include "data/grid_files.h"
 #include "geometry/shapes.h"
+#include "results/detailed_series.h"
+#include "results/storing.h"
 #include "simspec/basic_parameters.h"
 #include "simspec/model_components.h"
 #include "simspec/periods.h"
@@ -209,6 +211,35 @@ TEST_F(Coverage, HoldsPeriodsAndGapsAgainstTheSimulation) {
     const auto board = Board();
     EXPECT_EQ(RowOf(*board, "rain.nds0").TimeText(), row.text);
     EXPECT_EQ(RowOf(*board, "rain.nds0").state, row.state) << row.text;
+  }
+}
+
+TEST_F(Coverage, HoldsObservedValuesAgainstTheSimulationThatTheyNeedNotCover) {
+  auto& point = *document_.Root().Important(kStoringResults)->Child<CDetailedTSOutputListKvf>()->AddItem();
+  point.HydrComp = 61;
+  point.InclObserved = 1;
+  const struct {
+    CYbDateTime begin;
+    int days;
+    std::string text;
+    CoverageState state;
+  } cases[] = {
+      {{2000, 1, 1}, 800, "covers the simulation", CoverageState::Fine},
+      {{2000, 7, 11}, 345, "starts 10 days late; ends 10 days early", CoverageState::Fine},
+      {{1990, 1, 1}, 300, "ends 365 days early", CoverageState::Warning},
+  };
+  int number = 0;
+  for (const auto& c : cases) {
+    const std::string file = "observed" + std::to_string(++number) + ".nds0";
+    WriteSeries(file, c.begin, c.days, {1, 2});
+    point.Observed().Choose(FileName(file, folder_.Path()));
+    const auto board = Board();
+    const CoverageRow& row = RowOf(*board, file);
+    EXPECT_EQ(row.TimeText(), c.text);
+    EXPECT_EQ(row.state, c.state) << row.TimeText();
+    EXPECT_THAT(point.Observed().Findings(), IsEmpty());
+    const std::string told = row.remarks.empty() ? std::string() : row.remarks.front().text;
+    EXPECT_EQ(told, c.state == CoverageState::Warning ? "It has no values in the time of the simulation" : "");
   }
 }
 
