@@ -98,12 +98,15 @@ std::shared_ptr<const GridPicture> GridPicture::Make(const GridLayer& layer, con
     hillshade.emplace(*layer.grid);
     picture->palette_.MakeShades();
   }
+  // Where no cell is more than another, nobody asks how many there are.
+  const bool countsCells = picture->palette_.KeepsSingleCells();
   for (std::size_t row = 0; row < static_cast<std::size_t>(finest.ny); ++row) {
     if (isGivenUp) return nullptr;
     for (std::size_t cell = row * rowLength; cell < (row + 1) * rowLength; ++cell) {
       std::uint8_t color = picture->palette_.ColorNumber(values[cell]);
       if (hillshade && color != 0) color = picture->palette_.Shaded(color, hillshade->ShadeOf(cell));
-      ++cellsOfColor[finest.colors[cell] = color];
+      finest.colors[cell] = color;
+      if (countsCells) ++cellsOfColor[color];
     }
   }
   picture->levels_.push_back(std::move(finest));
