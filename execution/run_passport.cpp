@@ -26,17 +26,9 @@ std::string TimeText(std::int64_t milliseconds) {
                            : CYbDateTime::FromSecondsSinceEpoch(milliseconds / 1000).Format("%Y-%m-%d %H:%M:%S");
 }
 
-/// With all digits that the file system has.
-std::string TimeText(std::filesystem::file_time_type time) {
-  const auto since =
-      std::chrono::duration_cast<std::chrono::nanoseconds>(std::chrono::file_clock::to_sys(time).time_since_epoch());
-  const auto seconds = std::chrono::floor<std::chrono::seconds>(since);
-  return fmt::format("{}.{:09}", TimeText(seconds.count() * 1000), (since - seconds).count());
-}
-
 void PutStamp(const FileStamp& stamp, PassportInput& input) {
   input.size = stamp.exists ? std::to_string(stamp.size) : std::string();
-  input.modified = stamp.exists ? TimeText(stamp.time) : std::string();
+  input.modified = stamp.exists ? TextOfTime(stamp.time) : std::string();
 }
 
 bool IsAsItWas(const PassportInput& input) {
@@ -86,6 +78,13 @@ bool RunPassport::HasAllHashes() const {
   return std::ranges::none_of(inputs, [](const PassportInput& input) {
     return input.hash.empty() && input.problem.empty() && !input.size.empty();
   });
+}
+
+std::string TextOfTime(std::filesystem::file_time_type time) {
+  const auto since =
+      std::chrono::duration_cast<std::chrono::nanoseconds>(std::chrono::file_clock::to_sys(time).time_since_epoch());
+  const auto seconds = std::chrono::floor<std::chrono::seconds>(since);
+  return fmt::format("{}.{:09}", TimeText(seconds.count() * 1000), (since - seconds).count());
 }
 
 PassportFiles PassportFilesOf(std::string_view resultFolder, std::string_view setup) {

@@ -6,6 +6,7 @@
 #pragma once
 
 #include <cstdint>
+#include <filesystem>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -25,6 +26,9 @@ struct PassportInput {
   std::string hash;      ///< See `HashFile`; empty as long as it is not known.
   std::string problem;   ///< Why it never will be: "it changed while the run went on".
 };
+
+/// As passports tell times, with all digits that the file system has.
+std::string TextOfTime(std::filesystem::file_time_type time);
 
 struct RunPassport {
   std::string id;  ///< That of the run's state.

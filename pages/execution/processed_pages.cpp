@@ -58,7 +58,7 @@ int ItemOf(const CPreprocessedDataEntity& n) { return n.GetNumber("ItemNo"); }
 
 /// Where the report lies, and what was read of it.
 void DescribeReport(PageForm& form, CProcDataKvf& n, CYbSEDlgBase& page) {
-  DescribePassport(form, page);
+  DescribeStale(form, page);
   const auto manager = [&n] { return n.Manager(); };
   form.ReadOnlyText("Report:", [manager] { return manager() ? manager()->Path() : std::string(); });
   form.Notice([manager] {

@@ -4,7 +4,7 @@
 
 #include <fmt/format.h>
 
-#include "core/document.h"
+#include "document/flow_model_document.h"
 #include "execution/run_passport.h"
 #include "platform/paths.h"
 
@@ -51,12 +51,22 @@ std::string NoticeOf(const CYbSEDlgBase& page) {
   return text;
 }
 
-/// The same of the changes alone.
+/// Whether the preprocessor has run once more since the run ended, which leaves no passport of its own.
+bool IsPreprocessedAnew(const CYbSEDlgBase& page, const RunPassport& passport) {
+  const auto* document = dynamic_cast<const CFlowModelDoc*>(&page.Context().document);
+  if (!document || passport.ended.empty()) return false;
+  const FileStamp report = StampOf(ResolvedPath(document->PreprocessorReport(), {}));
+  // To the second, as the passport tells it.
+  return report.exists && TextOfTime(report.time).substr(0, passport.ended.size()) > passport.ended;
+}
+
+/// The same of the changes alone, for what the preprocessor made in that run.
 std::string StaleNoticeOf(const CYbSEDlgBase& page) {
   if (page.Context().document.PathName().empty()) return {};
   std::string problem;
   const std::optional<RunPassport> passport = ReadPassport(FilesOf(page).passport, problem);
-  const std::string changes = passport ? ChangesSince(*passport) : std::string();
+  if (!passport || IsPreprocessedAnew(page, *passport)) return {};
+  const std::string changes = ChangesSince(*passport);
   return changes.empty() ? std::string() : fmt::format("This was made on {} UTC. {}", passport->begun, changes);
 }
 

@@ -10,6 +10,7 @@
 #include <gmock/gmock.h>
 
 #include "document/edit_session.h"
+#include "execution/run_passport.h"
 #include "forms/plots.h"
 #include "pages/tree_entries.h"
 #include "platform/text.h"
@@ -91,6 +92,26 @@ TEST(ProcessedPages, EveryPageShowsWhatItsStoredTextShows) {
   EXPECT_EQ(test::ReadFile(stored.string()), text);
   EXPECT_THAT(run.Host().told, ElementsAre());
   EXPECT_FALSE(run.Session().IsModified());
+}
+
+TEST(ProcessedPages, WhatWasWrittenSinceTheRunIsToldUntilThePreprocessorRunsAnew) {
+  RunSetup run;
+  RunPassport passport;
+  passport.setup = run.Session().Path();
+  passport.begun = "2026-01-01 10:00:00";
+  passport.ended = "2099-01-01 10:00:00";
+  passport.inputs = {{run.Session().Path(), "1", "2026-01-01 09:00:00.000000000", {}, {}}};
+  const auto notice = [&] {
+    EXPECT_EQ(WritePassport(passport, run.Result("karup_Passport.kvf")).error, "");
+    return run.Text("Topography");
+  };
+  EXPECT_THAT(notice(),
+              HasSubstr("This was made on 2026-01-01 10:00:00 UTC. Written anew or gone since then: the setup."));
+  passport.ended = "2026-01-01 10:00:01";  // the report is younger
+  EXPECT_THAT(notice(), testing::Not(HasSubstr("Written anew")));
+  passport.ended.clear();
+  passport.inputs.clear();
+  EXPECT_THAT(notice(), testing::Not(HasSubstr("Written anew")));
 }
 
 TEST(ProcessedPages, AFileThatCannotBeShownIsToldOnItsPage) {

@@ -134,6 +134,12 @@ TEST_F(ViewerPage, TellsTheRunAndWhatWasWrittenSince) {
     if (control.label == "Open the Setup That Made This") page->Press(control);
   });
   EXPECT_THAT(opened, ElementsAre(files.setup));
+  // The program shows both runs when it is handed the other one's passport.
+  host.Expect("Compare With Another Run", folder.File("earlier/karup_Passport.kvf"));
+  page->Form().ForEach([&](Control& control) {
+    if (control.label == "Compare With Another Run...") page->Press(control);
+  });
+  EXPECT_EQ(opened.back(), folder.File("earlier/karup_Passport.kvf"));
 }
 
 }  // namespace
