@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "core/message.h"
 #include "platform/computation.h"
 
 namespace tervane {
@@ -67,6 +68,13 @@ class Host {
   virtual std::optional<LibraryChoice> SelectLibraryEntry(const LibraryQuestion& question) = 0;
 
   virtual void OpenBrowser(const std::string& address) = 0;
+
+  /// Sends a message to the main window of the program; false where there is none, or it does not take it.
+  virtual bool Send(const Message& /*message*/) { return false; }
+  /// Has a file opened in an editor of its kind.
+  void OpenInEditor(const std::string& path) {
+    if (!path.empty()) Send({kMainWindowMessage, kOpenFile, path});
+  }
 
   /// Does what the user has asked for and waits for. A desktop shows meanwhile how far it is, in a window in which it
   /// can be cancelled; what is computed must touch no node and nothing of the caller's, since that may be done in

@@ -23,8 +23,6 @@ struct PageContext {
   /// Marks the document modified and makes the views follow; `action` names what the user did ("Change End Date"),
   /// `source` is the control in which it was done, so that its changes in quick succession are undone as one.
   std::function<void(int hint, const std::string& action, const void* source)> updateDoc;
-  /// Opens a data file in the program's viewer; empty where there is none.
-  std::function<void(const std::string& path)> openDataFile = {};
   /// Shows another node's page.
   std::function<void(const CYbSEKvfBase& node)> selectNode = {};
   /// Shows a form with OK and Cancel. `accept` is asked at OK: it gives why the form must stay, or nothing. False when

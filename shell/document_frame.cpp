@@ -276,7 +276,6 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
                       }};
   context.displayUnits = &program_.Units();
   context.isReplacement = isRebuilding_;
-  context.openDataFile = [this](const std::string& path) { emit DataFileWanted(ToQt(path)); };
   context.syncSoon = [this] {
     QTimer::singleShot(0, this, [this] {
       if (page_) page_->Sync();

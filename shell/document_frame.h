@@ -115,8 +115,6 @@ class DocumentFrame : public QWidget {
   void ChangesWanted();
   /// Something for the status line.
   void Told(const QString& text);
-  /// A data file is to be shown in a viewer.
-  void DataFileWanted(const QString& path);
 
  private:
   void BuildBody();

@@ -151,21 +151,25 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
       frame, &DocumentFrame::ReloadWanted, this, [this, frame] { ReloadDocument(frame); }, Qt::QueuedConnection);
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
   connect(frame, &DocumentFrame::Told, this, [this](const QString& text) { statusBar()->showMessage(text, kToldFor); });
-  connect(frame, &DocumentFrame::DataFileWanted, this, [this, frame](const QString& path) {
-    if (IsNamedAsPassport(FromQt(path))) {
-      CompareRunWith(*frame, FromQt(path));
-      return;
-    }
-    const bool isSetup = path.endsWith(".tvd", Qt::CaseInsensitive);
-    if (!(isSetup ? OpenDocument(path) : ShowDataFile(path)) || !Viewer()) return;
-    Viewer()->PutOverMaps([setup = QPointer(frame)](MapContent& map) {
-      if (setup) AddDomainOutline(setup->Session().Document().Root(), map);
-    });
-  });
   tabs_->setCurrentIndex(tabs_->addTab(frame, frame->Title()));
   frame->FocusNextPane();
   SyncCommands();
   return frame;
+}
+
+bool MainWindow::Receive(const Message& message) {
+  const auto* path = std::get_if<std::string>(&message.lParam);
+  if (message.name != kMainWindowMessage || message.wParam != kOpenFile || !path) return false;
+  const QString file = ToQt(*path);
+  DocumentFrame* const sender = Frame();
+  if (sender && IsNamedAsPassport(*path)) return CompareRunWith(*sender, *path);
+  const bool isSetup = file.endsWith(".tvd", Qt::CaseInsensitive);
+  if (!(isSetup ? OpenDocument(file) : ShowDataFile(file))) return false;
+  if (DataViewer* viewer = Viewer(); viewer && sender)
+    viewer->PutOverMaps([setup = QPointer(sender)](MapContent& map) {
+      if (setup) AddBackdrop(setup->Session().Document().Root(), map);
+    });
+  return true;
 }
 
 void MainWindow::NewDocument() { AddFrame(EditSession::New(program_.RecoveryFolder())); }

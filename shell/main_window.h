@@ -29,7 +29,7 @@ class TemplateTab;
 class WelcomePage;
 
 /// The window of the program: documents in tabs, and the commands on them.
-class MainWindow : public QMainWindow {
+class MainWindow : public QMainWindow, public MessageReceiver {
   Q_OBJECT
 
  public:
@@ -42,14 +42,14 @@ class MainWindow : public QMainWindow {
   /// Opens a setup in a tab of its own, or shows the one in which it is open. False when it could not be opened; the
   /// user has been told why.
   bool OpenDocument(const QString& path);
-  /// Shows a data file in a tab of its own, a text file in the desktop's editor. False when neither can be done; the
-  /// user has been told why.
   /// Asks for another setup, and shows in a tab how one that is open differs from it.
   void Compare(DocumentFrame& frame);
   /// The same with the setup of a file; false, with a message, where it cannot be read.
   bool CompareWith(DocumentFrame& frame, const std::string& path);
   /// Shows the latest run of a document beside the one of a passport; false, with a message, where one cannot be read.
   bool CompareRunWith(DocumentFrame& frame, const std::string& passport);
+  /// Shows a data file in a tab of its own, a text file in the desktop's editor. False when neither can be done; the
+  /// user has been told why.
   bool ShowDataFile(const QString& path);
   /// Opens a library of named entries in a tab of its own, or shows the one in which it is open.
   bool OpenLibrary(const LibraryKind& kind, const QString& path);
@@ -59,6 +59,8 @@ class MainWindow : public QMainWindow {
   void SetUnattended() { host_.SetUnattended(); }
   /// One of these, by the file's name.
   bool OpenFile(const QString& path);
+  /// Opens files for pages of the setup that is shown.
+  bool Receive(const Message& message) override;
   /// Offers what a crash left of setups that nobody opens by name.
   void OfferRecoveries();
   bool SaveDocument();

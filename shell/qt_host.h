@@ -28,6 +28,9 @@ class QtHost : public Host {
   std::optional<int> AskItem(const ItemQuestion& question) override;
   std::optional<LibraryChoice> SelectLibraryEntry(const LibraryQuestion& question) override;
   void OpenBrowser(const std::string& address) override;
+  /// The window that takes what is sent.
+  void SetReceiver(MessageReceiver* receiver) { receiver_ = receiver; }
+  bool Send(const Message& message) override { return receiver_ && receiver_->Receive(message); }
   bool Compute(const std::shared_ptr<Computation>& computation) override;
   std::string Setting(const std::string& name) const override;
   void SetSetting(const std::string& name, const std::string& value) override;
@@ -35,6 +38,7 @@ class QtHost : public Host {
  private:
   QPointer<QWidget> window_;
   QSettings& settings_;
+  MessageReceiver* receiver_ = nullptr;
   bool isUnattended_ = false;
 };
 

@@ -113,11 +113,7 @@ SeriesContent SeriesChart(const CPreprocessedDataEntity& n) {
 /// A time series with the simulation period.
 void DescribeSeries(PageForm& form, CPreprocessedDataEntity& n, CYbSEDlgBase& page) {
   DescribeFile(form, n, page);
-  form.Button("Edit...",
-              [&n, &page] {
-                if (const std::string file = n.GetFile(); !file.empty() && page.Context().openDataFile)
-                  page.Context().openDataFile(file);
-              })
+  form.Button("Edit...", [&n, &page] { page.Outside().OpenInEditor(n.GetFile()); })
       .ToolTip("Use time series editor to view time series data");
   form.Notice([&n] {
     std::string notice;

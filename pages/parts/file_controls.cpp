@@ -33,7 +33,7 @@ void EditDataFile(const PageContext& context, const CYbSEKvfBase& node, const Fi
   if (const COverlaysKvf* overlays = node.Important(kOverlays)) {
     if (PrepareGridState(*overlays, file, item, context.host).empty()) return;
   }
-  if (context.openDataFile) context.openDataFile(file.Absolute());
+  context.host.OpenInEditor(file.Absolute());
 }
 
 bool MayCreateFile(const PageContext& context) {

@@ -85,8 +85,8 @@ void DescribePassport(PageForm& form, const CYbSEDlgBase& page) {
                 const std::string setup = FilesOf(page).setup;
                 if (!FileExists(setup))
                   page.Context().host.ShowMessage("The run left no copy of its setup.", Host::Icon::Information);
-                else if (page.Context().openDataFile)
-                  page.Context().openDataFile(setup);
+                else
+                  page.Outside().OpenInEditor(setup);
               })
       .ToolTip("Opens a copy of the setup as it was when the run began")
       .ShownWhen(HasPassport(page));

@@ -12,11 +12,7 @@ namespace tervane {
 void DescribeSeriesFile(PageForm& form, const CYbSEDlgBase& page, const std::string& label, CFMData0DFile& file,
                         FirstSeries first, const Condition& isShown) {
   form.DataFile(label, file).Filter(kSeriesFileFilter).DefaultExtension("nds0").ShownWhen(isShown);
-  form.Button("Edit...",
-              [&file, &page] {
-                if (page.Context().openDataFile) page.Context().openDataFile(file.File.Absolute());
-              })
-      .ShownWhen(isShown);
+  form.Button("Edit...", [&file, &page] { page.Outside().OpenInEditor(file.File.Absolute()); }).ShownWhen(isShown);
   form.Button("Create...",
               [&page, &file, first = std::move(first)] {
                 CTvnCreate0DNdsDlg dialog(page.Context(), page.Node(), first.value,

@@ -106,9 +106,7 @@ void CResultViewerDlg::View(const Row& row) {
   const auto* overlays = Node().Important(kOverlays);
   if (!overlays) return;
   const std::string path = ResolvedPath(ViewerSetupFile(Context().document.getResultFolder(), row.item.name), {});
-  const auto open = [&] {
-    if (Context().openDataFile) Context().openDataFile(path);
-  };
+  const auto open = [&] { Outside().OpenInEditor(path); };
   if (FileExists(path)) {
     const auto answer =
         Outside().Ask("Do you want to overwrite the existing Results Viewer setup file for this item?\n" + path,

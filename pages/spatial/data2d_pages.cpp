@@ -181,11 +181,7 @@ void CData2DDlg::Describe(PageForm& form) {
               })
       .Beside()
       .ShownWhen(isGrid);
-  form.Button("Edit...",
-              [this] {
-                if (Context().openDataFile) Context().openDataFile(Node().XyzFile().File.Absolute());
-              })
-      .ShownWhen(isXyz);
+  form.Button("Edit...", [this] { Outside().OpenInEditor(Node().XyzFile().File.Absolute()); }).ShownWhen(isXyz);
   if (n.HasRelativeToGround()) form.Check("Values relative to ground", n.RelativeToGround);
 
   PageForm& units = form.Group("Units of Shape Files", isScattered);

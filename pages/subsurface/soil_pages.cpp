@@ -91,11 +91,7 @@ std::shared_ptr<TableOf<SoilLayer>> CUZSoilProfilePropDlg::SoilTable() const {
   table->Button("", "...", [this](SoilLayer& layer) { SelectSoil(layer); })
       .Width(25)
       .ToolTip("Choose a soil of a library");
-  table
-      ->Button("", "Edit",
-               [this](SoilLayer& layer) {
-                 if (Context().openDataFile) Context().openDataFile(layer.DataBase.Absolute());
-               })
+  table->Button("", "Edit", [this](SoilLayer& layer) { Outside().OpenInEditor(layer.DataBase.Absolute()); })
       .EnabledWhen([](SoilLayer& layer) { return !layer.DataBase.IsEmpty(); })
       .Width(25)
       .ToolTip("Edit the library");

@@ -69,8 +69,8 @@ class CSZWellDlg : public PageOf<CSZWellKvf> {
     if (file.IsEmpty()) return;
     if (!WhyNotReadable(file.Absolute()).empty())
       Outside().ShowMessage("The pumping-well file is missing", Host::Icon::Error);
-    else if (Context().openDataFile)
-      Context().openDataFile(file.Absolute());
+    else
+      Outside().OpenInEditor(file.Absolute());
   }
 
   void Create() {

@@ -128,11 +128,7 @@ std::shared_ptr<TableOf<Item>> CropControls::CVegetationGrid() const {
   table->Button("", "...", [this](Item& crop) { SelectVegetation(crop); })
       .Width(25)
       .ToolTip("Choose a vegetation of a library");
-  table
-      ->Button("", "Edit",
-               [this](Item& crop) {
-                 if (page_.Context().openDataFile) page_.Context().openDataFile(crop.VegPropFile().File.Absolute());
-               })
+  table->Button("", "Edit", [this](Item& crop) { page_.Outside().OpenInEditor(crop.VegPropFile().File.Absolute()); })
       .EnabledWhen([](Item& crop) { return !crop.VegPropFile().File.IsEmpty(); })
       .Width(25)
       .ToolTip("Edit the library");

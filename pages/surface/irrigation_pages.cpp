@@ -153,7 +153,7 @@ void CIrrCommandAreasPropDlg::DescribeLicense(PageForm& form) {
   form.Button("Edit...",
               [this] {
                 const Source* source = table_->Current();
-                if (source && Context().openDataFile) Context().openDataFile(source->LicenseFile().File.Absolute());
+                if (source) Outside().OpenInEditor(source->LicenseFile().File.Absolute());
               })
       .EnabledWhen(isLimited);
   form.Button("Create...", [this] { CreateLicense(); }).Beside().EnabledWhen(isLimited);

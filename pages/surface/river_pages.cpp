@@ -20,7 +20,7 @@ constexpr int kFollowedByTree = kDataChanged | kTreeRebuilt;
 void EditButton(PageForm& form, const CYbSEDlgBase& page, const FileName& file, const Condition& isShown = {}) {
   form.Button("Edit...",
               [&page, &file] {
-                if (!file.IsEmpty() && page.Context().openDataFile) page.Context().openDataFile(file.Absolute());
+                if (!file.IsEmpty()) page.Outside().OpenInEditor(file.Absolute());
               })
       .ShownWhen(isShown);
 }

@@ -38,6 +38,14 @@ std::optional<int> ScriptedHost::AskItem(const ItemQuestion& question) {
 std::optional<Host::LibraryChoice> ScriptedHost::SelectLibraryEntry(const LibraryQuestion& question) {
   return Next<std::optional<LibraryChoice>>(std::string(question.kind.name));
 }
+std::vector<std::string> ScriptedHost::Opened() const {
+  std::vector<std::string> paths;
+  for (const Message& message : sent_)
+    if (message.name == kMainWindowMessage && message.wParam == kOpenFile)
+      paths.push_back(std::get<std::string>(message.lParam));
+  return paths;
+}
+
 void ScriptedHost::OpenBrowser(const std::string& address) { Unexpected(address); }
 std::string ScriptedHost::Setting(const std::string&) const { return {}; }
 void ScriptedHost::SetSetting(const std::string& name, const std::string&) { Unexpected(name); }

@@ -27,6 +27,10 @@ class ScriptedHost : public Host {
   bool IsDone() const { return script_.empty(); }
   /// What was shown by the latest question for an item.
   const ItemQuestion& Items() const { return items_; }
+  /// The messages to the main window.
+  const std::vector<Message>& Sent() const { return sent_; }
+  /// The files that were to be opened in an editor.
+  std::vector<std::string> Opened() const;
 
   Answer Ask(const std::string& text, Icon icon, Buttons buttons) override;
   std::optional<std::string> AskFileToOpen(const FileQuestion& question) override;
@@ -34,6 +38,10 @@ class ScriptedHost : public Host {
   std::optional<int> AskItem(const ItemQuestion& question) override;
   std::optional<LibraryChoice> SelectLibraryEntry(const LibraryQuestion& question) override;
   void OpenBrowser(const std::string& address) override;
+  bool Send(const Message& message) override {
+    sent_.push_back(message);
+    return true;
+  }
   std::string Setting(const std::string& name) const override;
   void SetSetting(const std::string& name, const std::string& value) override;
 
@@ -43,6 +51,7 @@ class ScriptedHost : public Host {
 
   std::deque<std::pair<std::string, Reply>> script_;
   ItemQuestion items_;
+  std::vector<Message> sent_;
 };
 
 /// The page of a node of a setup, driven by its labels.

@@ -33,7 +33,11 @@ class Listener : public NobodyToAsk {
     told.push_back(text);
     return Answer::Yes;
   }
-  std::vector<std::string> told;
+  bool Send(const Message& message) override {
+    opened.push_back(std::get<std::string>(message.lParam));
+    return true;
+  }
+  std::vector<std::string> told, opened;
 };
 
 /// A setup with all that the preprocessor left of it.
@@ -48,7 +52,7 @@ class RunSetup {
   std::string Result(const std::string& name) const { return folder_.File("karup_results/" + name); }
   EditSession& Session() { return *session_; }
   Listener& Host() { return host_; }
-  std::vector<std::string>& Opened() { return opened_; }
+  std::vector<std::string>& Opened() { return host_.opened; }
 
   std::unique_ptr<CYbSEDlgBase> Page(const std::string& path, bool isReplacement = false) {
     CYbSEKvfBase* node =
@@ -58,7 +62,6 @@ class RunSetup {
                         [this, node](int hint, const std::string& action, const void* source) {
                           session_->UpdateDoc(*node, hint, action, source);
                         }};
-    context.openDataFile = [this](const std::string& file) { opened_.push_back(file); };
     context.isReplacement = isReplacement;
     return MakePage(*PageClassOf(*node), *node, context);
   }
@@ -81,7 +84,6 @@ class RunSetup {
   test::TempFolder folder_;
   Listener host_;
   std::unique_ptr<EditSession> session_;
-  std::vector<std::string> opened_;
 };
 
 TEST(ProcessedPages, EveryPageShowsWhatItsStoredTextShows) {

@@ -30,7 +30,6 @@ struct ViewerPage : testing::Test {
   test::TempFolder folder;
   CFlowModelDoc document;
   test::ScriptedHost host;
-  std::vector<std::string> opened;
   std::unique_ptr<CYbSEDlgBase> page;
 
   void Open() {
@@ -38,7 +37,6 @@ struct ViewerPage : testing::Test {
     ASSERT_TRUE(document.OnOpenDocument(setup));
     CYbSEKvfBase& node = *document.Root().Important(kResult)->Child<CResultViewerKvf>();
     PageContext context{document, host, [](int, const std::string&, const void*) {}};
-    context.openDataFile = [this](const std::string& path) { opened.push_back(path); };
     page = MakePage(kResultViewerPage, node, context);
   }
   TableForm& Table() {
@@ -66,7 +64,7 @@ TEST_F(ViewerPage, ShowsTheItemsAndHandsThemToTheViewer) {
   EXPECT_TRUE(table.Press(1, 3));
   const std::string path = folder.File("karup_results/depthof water.REV");
   EXPECT_THAT(test::ReadFile(path), HasSubstr("target QUARZEL_RESULT_VIEWER"));
-  EXPECT_THAT(opened, ElementsAre(path));
+  EXPECT_THAT(host.Opened(), ElementsAre(path));
 
   // One that is there is overwritten when the user wants that.
   folder.Write("karup_results/depthof water.REV", "mine");
@@ -74,14 +72,14 @@ TEST_F(ViewerPage, ShowsTheItemsAndHandsThemToTheViewer) {
       "Do you want to overwrite the existing Results Viewer setup file for this item?\n" + path;
   host.Expect(question, Host::Answer::Cancel);
   table.Press(1, 3);
-  EXPECT_EQ(opened.size(), 1U);
+  EXPECT_EQ(host.Opened().size(), 1U);
   host.Expect(question, Host::Answer::No);
   table.Press(1, 3);
-  EXPECT_EQ(opened.size(), 2U);
+  EXPECT_EQ(host.Opened().size(), 2U);
   EXPECT_EQ(test::ReadFile(path), "mine");
   host.Expect(question, Host::Answer::Yes);
   table.Press(1, 3);
-  EXPECT_EQ(opened.size(), 3U);
+  EXPECT_EQ(host.Opened().size(), 3U);
   EXPECT_NE(test::ReadFile(path), "mine");
   EXPECT_TRUE(host.IsDone());
 }
@@ -108,7 +106,7 @@ TEST_F(ViewerPage, WhatCannotBeWrittenIsTold) {
               Host::Answer::Ok);
   Table().Press(2, 3);
   EXPECT_TRUE(host.IsDone());
-  EXPECT_THAT(opened, IsEmpty());
+  EXPECT_THAT(host.Opened(), IsEmpty());
 }
 
 TEST_F(ViewerPage, TellsTheRunAndWhatWasWrittenSince) {
@@ -133,13 +131,13 @@ TEST_F(ViewerPage, TellsTheRunAndWhatWasWrittenSince) {
   page->Form().ForEach([&](Control& control) {
     if (control.label == "Open the Setup That Made This") page->Press(control);
   });
-  EXPECT_THAT(opened, ElementsAre(files.setup));
+  EXPECT_THAT(host.Opened(), ElementsAre(files.setup));
   // The program shows both runs when it is handed the other one's passport.
   host.Expect("Compare With Another Run", folder.File("earlier/karup_Passport.kvf"));
   page->Form().ForEach([&](Control& control) {
     if (control.label == "Compare With Another Run...") page->Press(control);
   });
-  EXPECT_EQ(opened.back(), folder.File("earlier/karup_Passport.kvf"));
+  EXPECT_EQ(host.Opened().back(), folder.File("earlier/karup_Passport.kvf"));
 }
 
 }  // namespace

@@ -34,7 +34,6 @@ class CropPage : public testing::Test {
     PageContext context{document, host, [this](int hint, const std::string& action, const void*) {
                           changes.push_back(fmt::format("{} {}", hint, action));
                         }};
-    context.openDataFile = [this](const std::string& path) { opened = path; };
     page = MakePage(kVegetationPage, vegetation, context);
   }
   void AddCrop(const char* name, const CYbDateTime& start) {
@@ -57,7 +56,6 @@ class CropPage : public testing::Test {
   test::TempFolder folder;
   test::ScriptedHost host;
   std::vector<std::string> changes;
-  std::string opened;
   CFlowModelDoc document;
   CVegetationKvf& vegetation = *document.Root().Important(kVegetation);
   CVegetationListKvf& crops = vegetation.Global().Crops();
@@ -105,7 +103,7 @@ TEST_F(CropPage, ButtonsChooseAVegetationAndEditTheLibrary) {
   EXPECT_EQ(crops.GetItem(2)->VegPropFile().VegetationName(), "Maize");
   EXPECT_EQ(changes.back(), "1 Choose Vegetation");
   EXPECT_TRUE(table.Press(2, kEdit));
-  EXPECT_EQ(opened, path);
+  EXPECT_EQ(host.Opened(), std::vector{path});
   crops.GetItem(2)->VegPropFile().Choose({}, "");
   EXPECT_FALSE(table.Press(2, kEdit));
 }
