@@ -18,10 +18,10 @@
 namespace tervane {
 
 std::string_view NameOf(ControlKind kind) {
-  constexpr std::array<std::string_view, 24> names{"check",  "radio",  "choice",  "text",      "long text", "integer",
-                                                   "number", "date",   "file",    "label",     "button",    "table",
-                                                   "shown",  "notice", "view",    "text file", "browser",   "report",
-                                                   "map",    "chart",  "section", "depths",    "group",     "sub-form"};
+  constexpr std::array<std::string_view, 25> names{
+      "check",  "radio", "choice", "text",    "long text", "integer", "number",  "date",      "file",
+      "color",  "label", "button", "table",   "shown",     "notice",  "view",    "text file", "browser",
+      "report", "map",   "chart",  "section", "depths",    "group",   "sub-form"};
   return names[static_cast<std::size_t>(kind)];
 }
 
@@ -56,6 +56,23 @@ std::string EnterInt(const std::string& typed, const std::function<void(int)>& s
   std::string expected = EnterValue(number, typed);
   if (expected.empty()) set(number);
   return expected;
+}
+
+Control& BindColor(Control& control, std::function<unsigned()> get, std::function<void(unsigned)> set) {
+  // A default of one part is none of the colour.
+  control.isOfKey = false;
+  control.text = [get = std::move(get)] { return fmt::format("#{:06x}", get() & 0xffffff); };
+  control.enter = [set = std::move(set)](const std::string& typed) -> std::string {
+    const std::string_view digits = Trimmed(typed);
+    const std::size_t first = digits.starts_with('#') ? 1 : 0;
+    unsigned color = 0;
+    const auto result = std::from_chars(digits.data() + first, digits.data() + digits.size(), color, 16);
+    if (digits.size() != first + 6 || result.ec != std::errc() || result.ptr != digits.data() + digits.size())
+      return "a colour like #1f5fa8 was expected";
+    set(color);
+    return {};
+  };
+  return control;
 }
 
 }  // namespace
@@ -201,6 +218,42 @@ Control& PageForm::Number(std::string label, float& value, std::string format) {
 
 Control& PageForm::Number(std::string label, double& value, std::string format) {
   return AddNumber(std::move(label), value, std::move(format));
+}
+
+Control& PageForm::Percent(std::string label, float& value) {
+  Control& control = AddBound(ControlKind::Number, std::move(label), &value);
+  control.unit = "%";
+  control.text = [&value, &control] {
+    const double percent = static_cast<double>(value) * 100;
+    return ShownNumber(percent, control.NumberUnit(), "%.6g");
+  };
+  control.enter = [&value, &control](const std::string& typed) {
+    double percent = 0;
+    std::string expected = EnterNumber(percent, typed, control.NumberUnit());
+    if (expected.empty()) value = static_cast<float>(percent / 100);
+    return expected;
+  };
+  return control;
+}
+
+Control& PageForm::Color(std::string label, int& red, int& green, int& blue) {
+  const auto part = [](int value) { return static_cast<unsigned>(std::clamp(value, 0, 255)); };
+  return BindColor(
+      AddBound(ControlKind::Color, std::move(label), &red),
+      [&red, &green, &blue, part] { return part(red) << 16 | part(green) << 8 | part(blue); },
+      [&red, &green, &blue](unsigned color) {
+        red = static_cast<int>(color >> 16 & 0xff);
+        green = static_cast<int>(color >> 8 & 0xff);
+        blue = static_cast<int>(color & 0xff);
+      });
+}
+
+Control& PageForm::Color(std::string label, int& blueGreenRed) {
+  const auto turned = [](unsigned color) { return (color & 0xff) << 16 | (color & 0xff00) | (color >> 16 & 0xff); };
+  return BindColor(
+      AddBound(ControlKind::Color, std::move(label), &blueGreenRed),
+      [&blueGreenRed, turned] { return turned(static_cast<unsigned>(blueGreenRed)); },
+      [&blueGreenRed, turned](unsigned color) { blueGreenRed = static_cast<int>(turned(color)); });
 }
 
 Control& PageForm::Date(std::string label, CYbDateTime& value) {

@@ -52,6 +52,7 @@ enum class ControlKind {
   Number,
   Date,
   File,   ///< A file name with a button that browses.
+  Color,  ///< "#rrggbb", with a button that shows it and asks for another.
   Label,  ///< Text alone.
   Button,
   Table,
@@ -208,6 +209,11 @@ class PageForm {
   /// "%.1e"; empty for the shortest form.
   Control& Number(std::string label, float& value, std::string format = {});
   Control& Number(std::string label, double& value, std::string format = {});
+  /// A fraction that is shown and typed times 100.
+  Control& Percent(std::string label, float& value);
+  /// A colour that the node keeps as three parts from 0 to 255, or as one number with red in its lowest byte.
+  Control& Color(std::string label, int& red, int& green, int& blue);
+  Control& Color(std::string label, int& blueGreenRed);
   Control& Date(std::string label, CYbDateTime& value);
   Control& Date(std::string label, std::function<CYbDateTime()> get, std::function<void(const CYbDateTime&)> set);
   Control& File(std::string label, FileName& value);

@@ -26,7 +26,7 @@ void LetStandOut(MapContent& map, const Highlight& highlighted) {
 
 bool LooksSame(const MapContent& a, const MapContent& b) {
   return a.grids == b.grids && a.shapes == b.shapes && a.lines == b.lines && a.points == b.points &&
-         a.domain == b.domain && a.area == b.area && a.message == b.message && a.arrows == b.arrows;
+         a.below == b.below && a.above == b.above && a.domain == b.domain && a.area == b.area && a.message == b.message && a.arrows == b.arrows;
 }
 
 bool HasSameColors(const GridLayer& a, const GridLayer& b) {
@@ -112,6 +112,10 @@ std::string Summary(const MapContent& content) {
   }
   if (!content.points.empty()) parts.push_back(fmt::format("{} points", points));
   if (content.arrows) parts.push_back("arrows");
+  std::vector<std::string> backdrop;
+  for (const auto* side : {&content.below, &content.above})
+    for (const BackdropLayer& layer : *side) backdrop.push_back(layer.title);
+  if (!backdrop.empty()) parts.push_back(fmt::format("backdrop {}", fmt::join(backdrop, ", ")));
   if (std::string standsOut = HighlightText(content); !standsOut.empty()) parts.push_back(std::move(standsOut));
   if (content.request) parts.push_back(fmt::format("asks \"{}\"", content.request->prompt));
   return fmt::format("{}", fmt::join(parts, ", "));

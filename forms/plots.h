@@ -9,13 +9,16 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <variant>
 #include <vector>
 
 #include "geometry/grid.h"
 #include "geometry/level.h"
 #include "geometry/shapes.h"
+#include "overlays/overlay_styles.h"
 #include "platform/computation.h"
 #include "platform/dates.h"
+#include "platform/files.h"
 #include "platform/shared_values.h"
 
 namespace tervane {
@@ -116,6 +119,8 @@ struct ShapeLayer {
   bool isDomain = false;                   ///< The outline of the model's domain, in a colour of its own.
   /// What values are called in the legend and on the map; a value without a name is told.
   std::vector<std::pair<std::string, std::string>> names = {};
+  /// In the place of colours of the program: how a layer of the backdrop is drawn.
+  std::optional<ShapeStyle> style = {};
 
   bool operator==(const ShapeLayer&) const = default;
 };
@@ -151,6 +156,26 @@ struct PointLayer {
   bool operator==(const PointLayer&) const = default;
 };
 
+/// An image on a map, turned to the north, between its sides.
+struct ImageLayer {
+  std::string path;
+  FileStamp stamp;  ///< Of the file as it is meant, so that another one is read anew.
+  double left = 0, right = 0, bottom = 0, top = 0;
+  std::optional<unsigned> transparentColor = {};  ///< Red, green, blue.
+  bool isGrey = false;
+
+  bool operator==(const ImageLayer&) const = default;
+};
+
+/// A layer of the backdrop, below or above what the map is about. Nobody points at it.
+struct BackdropLayer {
+  std::string title;
+  std::variant<ImageLayer, GridLayer, ShapeLayer, LineLayer, PointLayer> drawn;
+  double transparency = 0;  ///< In addition to that of a grid: 0 as it is, 1 invisible.
+
+  bool operator==(const BackdropLayer&) const = default;
+};
+
 /// What a user points at.
 struct MapPick {
   MapPoint place;
@@ -180,13 +205,15 @@ struct MapRequest {
 /// then asks for the content anew; until then it lacks what is computed, and holds the rest.
 using Awaited = std::vector<std::shared_ptr<Computation>>;
 
-/// What a map shows, from the bottom up: grids, shapes, lines, points. Of each kind the first layer is the page's own.
+/// What a map shows, from the bottom up: grids, shapes, lines, points. A user points at the first layer of each kind.
 struct MapContent {
-  std::vector<GridLayer> grids;
-  std::vector<ShapeLayer> shapes;
-  std::vector<LineLayer> lines;
-  std::vector<PointLayer> points;
+  std::vector<GridLayer> grids = {};
+  std::vector<ShapeLayer> shapes = {};
+  std::vector<LineLayer> lines = {};
+  std::vector<PointLayer> points = {};
   std::optional<ArrowLayer> arrows = {};  ///< Over the grids, below all else.
+  /// The backdrop from the bottom up: below the grids, and above all but the points.
+  std::vector<BackdropLayer> below = {}, above = {};
   /// A line over all grids, shapes and lines that shows where the model lies; nobody points at it. Null for none.
   std::shared_ptr<const CYbShapeData> domain = {};
   std::optional<Envelope> area;  ///< Shown at first; the envelope of all layers when nothing is said.
@@ -195,7 +222,10 @@ struct MapContent {
   std::optional<MapRequest> request = {};
   Awaited awaited = {};
 
-  bool IsEmpty() const { return grids.empty() && shapes.empty() && lines.empty() && points.empty(); }
+  /// The backdrop alone is something to look at, too.
+  bool IsEmpty() const {
+    return grids.empty() && shapes.empty() && lines.empty() && points.empty() && below.empty() && above.empty();
+  }
 };
 
 /// Of the first layer of each kind: cells of that code, and what has that name or place.

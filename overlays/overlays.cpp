@@ -8,11 +8,13 @@
 
 #include "libraries/river_network.h"
 #include "overlays/pages.h"
+#include "platform/file_cache.h"
 #include "platform/item_types.h"
 #include "platform/paths.h"
 #include "platform/text.h"
 #include "platform/units.h"
 #include "simspec/model_components.h"
+#include "subsurface/wells.h"
 
 namespace tervane {
 
@@ -32,11 +34,18 @@ void ColorKeys(KeyExchange& keys, const std::string& key, OverlayColor& color) {
 
 struct KindText {
   const char* name;
-  const char* title;
+  std::string title;
+  const PageClass* page;
 };
-constexpr std::array kKinds{KindText{"Image", "Image Overlay"}, KindText{"Grid", "Grid Overlay"},
-                            KindText{"Shape", "Shape Overlay"}, KindText{"River", "River Overlay"},
-                            KindText{"Well", "Well Overlay"}};
+constexpr std::array kRiverSources{KeyChoice{COverlayRiverKvf::kOfSetup, "The river network of the setup"},
+                                   KeyChoice{COverlayRiverKvf::kOwnFile, "A file"}};
+constexpr std::array kWellSources{KeyChoice{COverlayWellKvf::kOfSetup, "The wells of the setup"},
+                                  KeyChoice{COverlayWellKvf::kOwnFile, "A file"}};
+
+const std::array kKinds{
+    KindText{"Image", "Image Overlay", &kImageOverlayPage}, KindText{"Grid", "Grid Overlay", &kGridOverlayPage},
+    KindText{"Shape", "Shape Overlay", &kShapeOverlayPage}, KindText{"River", "River Overlay", &kRiverOverlayPage},
+    KindText{"Well", "Well Overlay", &kWellOverlayPage}};
 
 const KindText* KindOf(int type) {
   return type >= 1 && type <= static_cast<int>(kKinds.size()) ? &kKinds[static_cast<std::size_t>(type - 1)] : nullptr;
@@ -48,10 +57,10 @@ const KindText* KindOf(int type) {
 
 void COverlayBMPKvf::ExchangeKeys(KeyExchange& keys) {
   FileKey(keys, "Filename", Filename);
-  keys("BMP_X0", BMP_X0);
-  keys("BMP_X1", BMP_X1);
-  keys("BMP_Y0", BMP_Y0);
-  keys("BMP_Y1", BMP_Y1);
+  keys("BMP_X0", BMP_X0).Quantity(quantity::kMapCoordinate);
+  keys("BMP_X1", BMP_X1).Quantity(quantity::kMapCoordinate);
+  keys("BMP_Y0", BMP_Y0).Quantity(quantity::kMapCoordinate);
+  keys("BMP_Y1", BMP_Y1).Quantity(quantity::kMapCoordinate);
   keys("BMP_TransparentColor", BMP_TransparentColor);
   keys("BMP_DisplayStyle", BMP_DisplayStyle);
   keys("Display", Display);
@@ -79,12 +88,12 @@ void COverlayShapeKvf::ExchangeKeys(KeyExchange& keys) {
   FileKey(keys, "Filename", Filename);
   keys("ItemDescr", ItemDescr);
   keys("ShapeAxisUnit", ShapeAxisUnit);
-  keys("PointSize", PointSize);
+  keys("PointSize", PointSize).Unit("mm");
   keys("PointStyle", PointStyle);
   keys("PointType", PointType);
   ColorKeys(keys, "PointColor", PointColor);
   ColorKeys(keys, "PointTextColor", PointTextColor);
-  keys("LineThickness", LineThickness);
+  keys("LineThickness", LineThickness).Unit("mm");
   keys("LineStyle", LineStyle);
   keys("PolygonStyle", PolygonStyle);
   ColorKeys(keys, "LineColor", LineColor);
@@ -99,7 +108,7 @@ void COverlayShapeKvf::ExchangeKeys(KeyExchange& keys) {
 }
 
 void COverlayRiverKvf::ExchangeKeys(KeyExchange& keys) {
-  keys("SourceFvrNwkType", SourceFvrNwkType);
+  keys("SourceFvrNwkType", SourceFvrNwkType).OneOf(kRiverSources);
   FileKey(keys, "FvrNwkFilename_Specified", FvrNwkFilename_Specified);
   keys("Display", Display);
 }
@@ -108,14 +117,22 @@ FileName COverlayRiverKvf::DrawnFile() const {
   return SourceFvrNwkType == kOfSetup ? RiverFileOfSetup(*this) : FvrNwkFilename_Specified;
 }
 
-FileName COverlayRiverKvf::GetRiverFile() {
+FileName COverlayRiverKvf::ShownFile() const {
   FileName file = DrawnFile();
-  if (SourceFvrNwkType != kOfSetup || EngineOf(*this) != kEngineTervane) return file;
   // Only a simulation leads on.
-  if (!EqualIgnoringCase(ExtensionOf(file.Text()), ".fvsim")) return {};
-  const NamedNetwork named = NetworkOfSimulation(file.Absolute());
+  if (SourceFvrNwkType != kOfSetup || EngineOf(*this) != kEngineTervane ||
+      !EqualIgnoringCase(ExtensionOf(file.Text()), ".fvsim"))
+    return file;
+  static FileCache<NamedNetwork> networks(kMostFacts);
+  const auto named = networks.Get(file.Absolute(), {}, [&] { return NetworkOfSimulation(file.Absolute()); });
   const std::string folder = GetRoot() ? GetRoot()->SetupFolder() : std::string();
-  FvrNwkFilename_Specified = named.problem.empty() ? FileName::Picked(named.path, folder) : FileName();
+  return named->problem.empty() ? FileName::Picked(named->path, folder) : FileName();
+}
+
+FileName COverlayRiverKvf::GetRiverFile() {
+  if (SourceFvrNwkType != kOfSetup || EngineOf(*this) != kEngineTervane) return DrawnFile();
+  if (!EqualIgnoringCase(ExtensionOf(DrawnFile().Text()), ".fvsim")) return {};
+  FvrNwkFilename_Specified = ShownFile();
   SourceFvrNwkType = kOwnFile;
   return FvrNwkFilename_Specified;
 }
@@ -124,7 +141,14 @@ void COverlayWellKvf::ExchangeKeys(KeyExchange& keys) {
   FileKey(keys, "WellFilename", WellFilename);
   keys("Display", Display);
   keys("Lables", Lables);
-  keys("SourceWellType", SourceWellType);
+  keys("SourceWellType", SourceWellType).OneOf(kWellSources);
+}
+
+FileName COverlayWellKvf::ShownFile() const {
+  if (SourceWellType != kOfSetup) return WellFilename;
+  const bool isByReservoirs = ModelCompOf(*this).SZ_ModelType == 1;
+  const auto* wells = isByReservoirs ? Important(kReservoirWells) : Important(kWells);
+  return wells ? wells->GetFilename() : FileName();
 }
 
 // ---- Layers
@@ -141,9 +165,14 @@ OverlayLayer* COverlayItemKvf::Layer() const {
   return KindOf(Type) ? dynamic_cast<OverlayLayer*>(GetChild(Type)) : nullptr;
 }
 
-std::string COverlayItemKvf::KindTitle() const {
+const std::string& COverlayItemKvf::GetTitle() const {
   const KindText* kind = KindOf(Type);
-  return kind ? kind->title : "";
+  return kind ? kind->title : CTvnKvfBase::GetTitle();
+}
+
+const PageClass* COverlayItemKvf::GetDlgRuntimeClass(int treeId) const {
+  const KindText* kind = KindOf(Type);
+  return kind && treeId == kSetupDataTree ? kind->page : nullptr;
 }
 
 const std::string& COverlayItemKvf::GetAbbreviatedTitle() const {
@@ -151,12 +180,16 @@ const std::string& COverlayItemKvf::GetAbbreviatedTitle() const {
   const OverlayLayer* layer = Layer();
   shownTitle_.clear();
   if (kind && layer) {
-    const std::string& path = layer->LayerFile().Text();
+    const std::string path = layer->ShownFile().Text();
     const std::string name = fmt::format("{}{}", BaseNameOf(path), ExtensionOf(path));
     shownTitle_ =
         fmt::format("{}{}: {}", layer->Display ? "" : "Disabled ", kind->name, path.empty() ? "Unknown" : name);
   }
   return shownTitle_;
+}
+
+COverlayListKvf::COverlayListKvf(std::string title, CYbSEKvfBase* parent) : CYbSEKvfListBase(title, title, parent) {
+  SetPage(kOverlayListPage);
 }
 
 void COverlayListKvf::StayWithRivers() {

@@ -21,6 +21,8 @@ class OverlayLayer : public CTvnKvfBase {
   int Display = 1;
   /// The file that the layer names; empty when it has none.
   virtual const FileName& LayerFile() const = 0;
+  /// The file that is shown: another one where the layer follows the setup; empty for none.
+  virtual FileName ShownFile() const { return LayerFile(); }
 };
 
 class COverlayBMPKvf : public OverlayLayer {
@@ -101,6 +103,8 @@ class COverlayRiverKvf : public OverlayLayer {
   /// simulation as its own file from now on.
   FileName GetRiverFile();
   const FileName& LayerFile() const override { return FvrNwkFilename_Specified; }
+  /// The network itself, also where a river simulation leads to it.
+  FileName ShownFile() const override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
@@ -110,11 +114,15 @@ class COverlayWellKvf : public OverlayLayer {
  public:
   explicit COverlayWellKvf(CYbSEKvfBase* parent) : OverlayLayer("Well overlay", "OverlayWell", parent) {}
 
+  enum Source : int { kOfSetup = 0, kOwnFile = 1 };
+
   FileName WellFilename;
-  int Lables = 0;          ///< The wells' names are drawn.
-  int SourceWellType = 0;  ///< 0 the wells of the setup, 1 a file.
+  int Lables = 0;  ///< The wells' names are drawn.
+  int SourceWellType = kOfSetup;
 
   const FileName& LayerFile() const override { return WellFilename; }
+  /// Of the setup the wells of the saturated zone's method in use.
+  FileName ShownFile() const override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override;
@@ -131,8 +139,10 @@ class COverlayItemKvf : public CTvnKvfBase {
 
   /// The layer of the kind in force; null when the type is none.
   OverlayLayer* Layer() const;
-  /// "Image Overlay"; empty when the type is none.
-  std::string KindTitle() const;
+  /// "Image Overlay"; that of any layer when the type is none.
+  const std::string& GetTitle() const override;
+  /// The page of the kind in force.
+  const PageClass* GetDlgRuntimeClass(int treeId) const override;
   /// The kind, whether it is shown, and the file's name: "Disabled Grid: soil.nds2".
   const std::string& GetAbbreviatedTitle() const override;
 
@@ -146,7 +156,7 @@ class COverlayItemKvf : public CTvnKvfBase {
 /// The layers above or below the data.
 class COverlayListKvf : public CYbSEKvfListBase<COverlayItemKvf>, public RiverFollowers {
  public:
-  COverlayListKvf(std::string title, CYbSEKvfBase* parent) : CYbSEKvfListBase(title, title, parent) {}
+  COverlayListKvf(std::string title, CYbSEKvfBase* parent);
 
   void StayWithRivers() override;
 };

@@ -9,5 +9,11 @@
 namespace tervane {
 
 inline constexpr PageClass kDisplayPage{"CDisplayDlg", 16479};
+inline constexpr PageClass kOverlayListPage{"COverlayListDlg", 0};
+inline constexpr PageClass kImageOverlayPage{"COverlayBMPDlg", 0};
+inline constexpr PageClass kGridOverlayPage{"COverlayGridDlg", 0};
+inline constexpr PageClass kShapeOverlayPage{"COverlayShapeDlg", 0};
+inline constexpr PageClass kRiverOverlayPage{"COverlayRiverDlg", 0};
+inline constexpr PageClass kWellOverlayPage{"COverlayWellDlg", 0};
 
 }  // namespace tervane

@@ -3,6 +3,7 @@
 #include "pages/page_table.h"
 
 #include "pages/document/document_pages.h"
+#include "pages/document/overlay_pages.h"
 #include "pages/execution/processed_pages.h"
 #include "pages/results/detailed_series_pages.h"
 #include "pages/results/statistics_pages.h"
@@ -54,6 +55,7 @@ struct PageFile {
 constexpr PageFile kFiles[] = {
     {"document", WholePages},
     {"document", DocumentPages},
+    {"document", OverlayPages},
     {"simspec", ComponentsPages},
     {"simspec", ControlPages},
     {"simspec", PeriodPages},

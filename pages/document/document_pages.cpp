@@ -4,9 +4,9 @@
 
 #include <fmt/format.h>
 
-#include "core/kvf.h"
 #include "data/grid_files.h"
 #include "execution/processed_pages.h"
+#include "overlays/image_place.h"
 #include "overlays/pages.h"
 #include "pages/document/coverage_page.h"
 #include "pages/document/help_pages.h"
@@ -19,35 +19,6 @@
 #include "platform/units.h"
 
 namespace tervane {
-
-namespace {
-
-/// The corners that the reference of an image tells, a parameter file; nothing, and the user is told why, when it
-/// cannot be read.
-std::optional<DataArea> ReadImagePlace(const std::string& path, Host& host) {
-  if (!FileExists(path)) {
-    host.ShowMessage("Can not open file", Host::Icon::Error);
-    return std::nullopt;
-  }
-  kvfGetErrorGlb();  // what an earlier reader left
-  KvfFile* file = kvfLoadFile(path, 0);
-  if (kvfGetErrorGlb() != kKvfNoError) {
-    host.ShowMessage(kvfErrorText() + "\n\nSyntax error in file name:\n" + path, Host::Icon::Error);
-    kvfClose(&file);
-    return std::nullopt;
-  }
-  DataArea area;
-  KvfNode* target = kvfTargetByNameNum(file, "QUARZEL_Graphical_Images", 1);
-  KvfNode* place = kvfSectionByNameNum(target, "World_Coordinates", 1);
-  const bool isRead = kvfGetParam(place, "x0", &area.x0, 1, 1) && kvfGetParam(place, "y0", &area.y0, 1, 1) &&
-                      kvfGetParam(place, "x1", &area.x1, 1, 1) && kvfGetParam(place, "y1", &area.y1, 1, 1);
-  kvfClose(&file);
-  if (isRead) return area;
-  host.ShowMessage(path + " tells no place: x0, y0, x1 and y1 were expected in World_Coordinates", Host::Icon::Error);
-  return std::nullopt;
-}
-
-}  // namespace
 
 std::string CTvnHelpView::PageName() const {
   const std::string& name = Node().GetHtml();
@@ -179,8 +150,6 @@ void CDisplayDlg::Import() {
   Node().SetArea(*area);
   UpdateDoc(kDataChanged, "Import Area");
 }
-
-namespace {}  // namespace
 
 std::span<const PageRow> DocumentPages() {
   static constexpr PageRow kRows[] = {

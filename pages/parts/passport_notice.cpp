@@ -96,7 +96,7 @@ void DescribePassport(PageForm& form, const CYbSEDlgBase& page) {
             const auto passport = page.Context().host.AskFileToOpen(
                 {"Compare With Another Run", "Passports of runs (*_Passport.kvf)|*_Passport.kvf|All Files (*.*)|*.*||",
                  "kvf", FilesOf(page).passport});
-            if (passport && page.Context().openDataFile) page.Context().openDataFile(*passport);
+            if (passport) page.Outside().OpenInEditor(*passport);
           })
       .ToolTip("Shows what differs between the setups of two runs, and how well each agrees with what was observed")
       .ShownWhen(HasPassport(page))

@@ -11,7 +11,7 @@
 
 #include "geometry/grid_outline.h"
 #include "overlays/overlays.h"
-#include "pages/parts/river_map.h"
+#include "pages/parts/backdrop.h"
 #include "platform/paths.h"
 #include "simspec/periods.h"
 #include "spatial/domain.h"
@@ -112,7 +112,21 @@ struct FileKey {
   bool operator==(const FileKey&) const = default;
 };
 
-std::shared_ptr<ComputedGrid> RecentGrid(const std::string& path, int item, const GridSlice& slice = {}) {
+/// The lines around the cells of a grid that hold a value.
+std::shared_ptr<Computed<CTvnShapeData>> RecentOutline(const std::string& path, int item) {
+  static RecentFiles<FileKey, CTvnShapeData> outlines;
+  return outlines.Get({path, {StampOf(path)}, item, {}, {}}, path,
+                      [path, item](CTvnShapeData& outline, ProgressPart progress) {
+                        CTvn2DOrthoRotatedGridData grid;
+                        FileResult read = ReadGridData(path, item, grid, progress);
+                        if (read.Ok()) MakeOutline(grid, outline);
+                        return read;
+                      });
+}
+
+}  // namespace
+
+std::shared_ptr<ComputedGrid> RecentGrid(const std::string& path, int item, const GridSlice& slice) {
   static RecentFiles<FileKey, CTvn2DOrthoRotatedGridData> grids;
   return grids.Get({path, {StampOf(path)}, item, {}, slice}, path,
                    [path, item, slice](CTvn2DOrthoRotatedGridData& grid, ProgressPart progress) {
@@ -131,43 +145,6 @@ std::shared_ptr<Computed<CTvnShapeData>> RecentShapes(const std::string& path, c
                    });
 }
 
-/// The lines around the cells of a grid that hold a value.
-std::shared_ptr<Computed<CTvnShapeData>> RecentOutline(const std::string& path, int item) {
-  static RecentFiles<FileKey, CTvnShapeData> outlines;
-  return outlines.Get({path, {StampOf(path)}, item, {}, {}}, path,
-                      [path, item](CTvnShapeData& outline, ProgressPart progress) {
-                        CTvn2DOrthoRotatedGridData grid;
-                        FileResult read = ReadGridData(path, item, grid, progress);
-                        if (read.Ok()) MakeOutline(grid, outline);
-                        return read;
-                      });
-}
-
-/// Grids, shapes and rivers of a list of layers that are shown.
-void AddLayers(const COverlayListKvf& list, MapContent& map) {
-  for (int number = 1; number <= list.GetItemCount(); ++number) {
-    const COverlayItemKvf& item = *list.GetItem(number);
-    const OverlayLayer* layer = item.Layer();
-    if (!layer || !layer->Display) continue;
-    const auto* river = dynamic_cast<const COverlayRiverKvf*>(layer);
-    if (river) AddRiver(map, river->DrawnFile());
-    if (river || layer->LayerFile().IsEmpty()) continue;
-    if (const auto* grid = dynamic_cast<const COverlayGridKvf*>(layer)) {
-      GridLayer drawn;
-      drawn.grid = NowOrAwaited(RecentGrid(grid->LayerFile().Absolute(), grid->GridFile().SelectedItem()), map.awaited);
-      if (!drawn.grid) continue;
-      drawn.withLegend = false;
-      drawn.transparency = std::min(1.0, static_cast<double>(grid->Transparency));
-      map.grids.push_back(std::move(drawn));
-    } else if (const auto* shape = dynamic_cast<const COverlayShapeKvf*>(layer)) {
-      if (auto data = NowOrAwaited(RecentShapes(shape->LayerFile().Absolute(), {}, shape->ShapeAxisUnit), map.awaited))
-        map.shapes.push_back({std::move(data), {}});
-    }
-  }
-}
-
-}  // namespace
-
 MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRotatedGridData> grid,
                    const std::string& problem) {
   MapContent map;
@@ -185,11 +162,10 @@ MapContent GridMap(const CYbSEKvfBase& node, std::shared_ptr<const CTvn2DOrthoRo
 
 void AddBackdrop(const CYbSEKvfBase& node, MapContent& map) {
   AddDomainOutline(node, map);
-  // The data stay first for what a user points at, whatever lies below them.
   const COverlaysKvf* overlays = node.Important(kOverlays);
   if (!overlays) return;
-  AddLayers(overlays->Background(), map);
-  AddLayers(overlays->Foreground(), map);
+  map.below = BuildPlotOverlays(overlays->Background(), map.awaited);
+  map.above = BuildPlotOverlays(overlays->Foreground(), map.awaited);
 }
 
 void AddDomainOutline(const CYbSEKvfBase& node, MapContent& map) {

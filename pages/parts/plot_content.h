@@ -27,6 +27,10 @@ MapContent GridFileMap(const CYbSEKvfBase& node, const std::string& path, int it
 MapContent FileMap(const DataFileNode& file, const GridSlice& slice = {});
 /// A map of a shape file with its attribute.
 MapContent ShapeFileMap(const CData2DShpFile& file, int axisUnit);
+/// A grid of a file, and the shapes of one with an attribute, empty for none; read once for all pages.
+std::shared_ptr<ComputedGrid> RecentGrid(const std::string& path, int item, const GridSlice& slice = {});
+std::shared_ptr<Computed<CTvnShapeData>> RecentShapes(const std::string& path, const std::string& attribute,
+                                                      int axisUnit);
 /// Puts the setup's layers behind and over what the map of a node shows, and the outline of the domain over all.
 void AddBackdrop(const CYbSEKvfBase& node, MapContent& map);
 /// Puts the outline of the domain of that node's setup over a map, but over one of the domain itself.

@@ -10,8 +10,6 @@
 
 namespace tervane {
 
-namespace {
-
 PointLayer PointsOf(const std::vector<CTvnWellData>& wells) {
   PointLayer layer;
   for (const CTvnWellData& well : wells) {
@@ -21,8 +19,6 @@ PointLayer PointsOf(const std::vector<CTvnWellData>& wells) {
   }
   return layer;
 }
-
-}  // namespace
 
 void AddWells(MapContent& map, const std::vector<CTvnWellData>& wells) {
   PointLayer layer = PointsOf(wells);

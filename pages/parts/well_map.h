@@ -7,6 +7,9 @@
 
 namespace tervane {
 
+/// Wells that have a place, with their names.
+PointLayer PointsOf(const std::vector<CTvnWellData>& wells);
+
 /// Puts wells with their names over a map.
 void AddWells(MapContent& map, const std::vector<CTvnWellData>& wells);
 

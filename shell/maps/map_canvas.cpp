@@ -39,7 +39,8 @@ std::optional<std::size_t> PointAt(const PointLayer& layer, MapPoint place, doub
 
 }  // namespace
 
-MapCanvas::MapCanvas(QWidget* parent) : QWidget(parent), vectors_(std::make_unique<VectorScene>()) {
+MapCanvas::MapCanvas(QWidget* parent)
+    : QWidget(parent), ground_(std::make_unique<Scene>()), vectors_(std::make_unique<Scene>()) {
   setMouseTracking(true);
   setFocusPolicy(Qt::StrongFocus);
   setMinimumSize(Theme::Get().Scaled(160), Theme::Get().Scaled(120));
@@ -92,6 +93,8 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
   if (content_.domain) domain_.emplace(ShapeLayer{.shapes = content_.domain, .isDomain = true});
   lines_.clear();
   for (const LineLayer& layer : content_.lines) lines_.emplace_back(layer, units_);
+  FollowBackdrop(content_.below, below_);
+  FollowBackdrop(content_.above, above_);
   if (wasEmpty || WholeArea() != area) isFitted_ = true;
   Arrange();
 }
@@ -117,8 +120,24 @@ void MapCanvas::Prepare(Layer& layer) {
   });
 }
 
+void MapCanvas::FollowBackdrop(const std::vector<BackdropLayer>& layers, std::vector<std::unique_ptr<Backdrop>>& made) {
+  std::vector<std::unique_ptr<Backdrop>> now;
+  for (const BackdropLayer& layer : layers) {
+    auto& backdrop = *now.emplace_back(std::make_unique<Backdrop>());
+    backdrop.layer = SharedLayer::Of(layer.drawn);
+    backdrop.transparency = layer.transparency;
+    if (backdrop.layer->IsReady()) continue;
+    connect(&backdrop.watcher, &QFutureWatcher<SharedLayer::Picture>::finished, this, [this] { Arrange(); });
+    backdrop.watcher.setFuture(backdrop.layer->Future());
+  }
+  // What is shown on goes from the old to the new, and is not let go between them.
+  made = std::move(now);
+}
+
 bool MapCanvas::IsPreparing() const {
-  return std::ranges::any_of(layers_, [](const auto& layer) { return !layer->picture || layer->isOld; });
+  const auto isMade = [](const auto& layer) { return layer->layer->IsReady(); };
+  return !std::ranges::all_of(layers_, [](const auto& layer) { return layer->picture && !layer->isOld; }) ||
+         !std::ranges::all_of(below_, isMade) || !std::ranges::all_of(above_, isMade);
 }
 
 void MapCanvas::ShowFrame(const GridLayer& grid, std::shared_ptr<const GridPicture> picture,
@@ -148,6 +167,8 @@ void MapCanvas::WaitUntilReady() {
     layer->picture = layer->watcher.result();
     layer->isOld = false;
   }
+  for (const auto* backdrop : {&below_, &above_})
+    for (const auto& layer : *backdrop) QFuture(layer->layer->Future()).waitForFinished();
   Arrange();
 }
 
@@ -159,6 +180,11 @@ std::optional<Envelope> MapCanvas::WholeArea() const {
   for (const ShapePicture& layer : shapes_) Extend(all, layer.Area());
   for (const LinePicture& layer : lines_) Extend(all, layer.Area());
   for (const PointLayer& layer : content_.points) Extend(all, EnvelopeAround(layer.points));
+  if (all) return all;
+  // The backdrop decides only where nothing else is shown.
+  for (const auto* backdrop : {&below_, &above_})
+    for (const auto& layer : *backdrop)
+      if (const auto picture = layer->layer->Get()) Extend(all, picture->Area());
   return all;
 }
 
@@ -182,7 +208,7 @@ void MapCanvas::Arrange() {
     map.setRight(legendPlace_.left() - Scaled(kLegendPadding));
   }
   window_.rect = map.toAlignedRect();
-  vectors_->picture = {};
+  ground_->picture = vectors_->picture = {};
   if (isFitted_)
     Fit();
   else
@@ -350,6 +376,10 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio, bool isScreen) {
   }
   painter.save();
   painter.setClipRect(window_.rect);
+  if (!below_.empty())
+    DrawScene(*ground_, painter, pixelRatio, isScreen, [this, pixelRatio](QPainter& inner, const DrawnMap& map) {
+      DrawBackdrop(below_, inner, map, pixelRatio);
+    });
   for (const auto& layer : layers_)
     if (layer->picture) layer->picture->Draw(painter, window_, pixelRatio, 1 - layer->grid.transparency);
   DrawVectors(painter, pixelRatio, isScreen);
@@ -361,19 +391,32 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio, bool isScreen) {
   DrawLegends(painter, isScreen);
 }
 
-void MapCanvas::DrawVectorPart(QPainter& painter, const DrawnMap& map) const {
-  painter.setRenderHint(QPainter::Antialiasing);
-  for (const ShapePicture& shapes : shapes_)
-    if (!shapes.ArePoints()) shapes.Draw(painter, map);
-  for (const LinePicture& lines : lines_) lines.Draw(painter, map);
-  if (domain_) domain_->Draw(painter, map);
+void MapCanvas::DrawBackdrop(const std::vector<std::unique_ptr<Backdrop>>& backdrop, QPainter& painter,
+                             const DrawnMap& map, double pixelRatio) const {
+  for (const auto& layer : backdrop) {
+    const auto picture = layer->layer->Get();
+    if (!picture) continue;
+    painter.setOpacity(1 - layer->transparency);
+    picture->Draw(painter, map, pixelRatio);
+  }
+  painter.setOpacity(1);
 }
 
 void MapCanvas::DrawVectors(QPainter& painter, double pixelRatio, bool isScreen) {
-  if (shapes_.empty() && lines_.empty() && !domain_) return;
+  if (shapes_.empty() && lines_.empty() && !domain_ && above_.empty()) return;
+  DrawScene(*vectors_, painter, pixelRatio, isScreen, [this, pixelRatio](QPainter& inner, const DrawnMap& map) {
+    for (const ShapePicture& shapes : shapes_)
+      if (!shapes.ArePoints()) shapes.Draw(inner, map);
+    for (const LinePicture& lines : lines_) lines.Draw(inner, map);
+    DrawBackdrop(above_, inner, map, pixelRatio);
+    if (domain_) domain_->Draw(inner, map);
+  });
+}
+
+void MapCanvas::DrawScene(Scene& scene, QPainter& painter, double pixelRatio, bool isScreen, const DrawPart& part) {
   DrawnMap map = Drawn();
-  if (!isScreen) return DrawVectorPart(painter, map);
-  VectorScene& scene = *vectors_;
+  painter.setRenderHint(QPainter::Antialiasing);
+  if (!isScreen) return part(painter, map);
   const QSize pixels = (QSizeF(size()) * pixelRatio).toSize();
   const bool isAlike = scene.picture.size() == pixels && scene.window.rect == window_.rect &&
                        scene.window.metresPerPixel == window_.metresPerPixel;
@@ -400,15 +443,16 @@ void MapCanvas::DrawVectors(QPainter& painter, double pixelRatio, bool isScreen)
   }
   map.window = scene.window;
   QPainter inner(&scene.picture);
-  for (const QRect& part : missing) {
-    const QRectF place(QPointF(part.topLeft()) / pixelRatio, QSizeF(part.size()) / pixelRatio);
+  inner.setRenderHint(QPainter::Antialiasing);
+  for (const QRect& border : missing) {
+    const QRectF place(QPointF(border.topLeft()) / pixelRatio, QSizeF(border.size()) / pixelRatio);
     // Also what the frame hides now: it comes into view when the map is moved.
     map.part = place;
     inner.setClipRect(place);
     inner.setCompositionMode(QPainter::CompositionMode_Source);
     inner.fillRect(place, Qt::transparent);
     inner.setCompositionMode(QPainter::CompositionMode_SourceOver);
-    DrawVectorPart(inner, map);
+    part(inner, map);
   }
   inner.end();
   painter.drawPixmap(0, 0, scene.picture);
@@ -425,6 +469,10 @@ void MapCanvas::DrawMarkers(QPainter& painter) {
   for (const PointLayer& points : content_.points) DrawLabelledPoints(painter, points, map, places);
   for (const LinePicture& lines : lines_) lines.DrawLabels(painter, map, places);
   for (const ShapePicture& shapes : shapes_) shapes.DrawLabels(painter, map, places);
+  for (const auto* backdrop : {&above_, &below_})
+    for (const auto& layer : *backdrop)
+      if (const auto picture = layer->layer->Get(); picture && layer->transparency < 1)
+        picture->DrawTexts(painter, map, places);
   DrawNorthArrow(painter);
   DrawScaleBar(painter, scale);
 }

@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "forms/plots.h"
+#include "shell/maps/backdrop_picture.h"
 #include "shell/maps/map_lines.h"
 #include "shell/maps/map_rendering.h"
 #include "shell/maps/map_shapes.h"
@@ -84,9 +85,15 @@ class MapCanvas : public QWidget {
   void Render(QPainter& painter, double pixelRatio, bool isScreen);
   /// How layers are drawn now.
   DrawnMap Drawn() const;
-  /// Shapes and lines. On the screen what was drawn is moved along with the map, and only its borders are drawn anew.
+  struct Scene;     ///< A part of the map as last drawn.
+  struct Backdrop;  ///< A layer of the backdrop, which may still be in the making.
+  using DrawPart = std::function<void(QPainter& painter, const DrawnMap& map)>;
+  void FollowBackdrop(const std::vector<BackdropLayer>& layers, std::vector<std::unique_ptr<Backdrop>>& made);
+  /// What `part` draws. On the screen what was drawn is moved along with the map, and only its borders are drawn anew.
+  void DrawScene(Scene& scene, QPainter& painter, double pixelRatio, bool isScreen, const DrawPart& part);
+  void DrawBackdrop(const std::vector<std::unique_ptr<Backdrop>>& backdrop, QPainter& painter, const DrawnMap& map,
+                    double pixelRatio) const;
   void DrawVectors(QPainter& painter, double pixelRatio, bool isScreen);
-  void DrawVectorPart(QPainter& painter, const DrawnMap& map) const;
   void DrawMarkers(QPainter& painter);
   /// Flow, and at the top an arrow that tells what lengths mean.
   void DrawFlow(QPainter& painter);
@@ -124,8 +131,9 @@ class MapCanvas : public QWidget {
   std::vector<ShapePicture> shapes_;
   std::optional<ShapePicture> domain_;
   std::vector<LinePicture> lines_;
-  struct VectorScene;  ///< Shapes and lines as last drawn.
-  std::unique_ptr<VectorScene> vectors_;
+  std::vector<std::unique_ptr<Backdrop>> below_, above_;
+  std::unique_ptr<Scene> ground_;   ///< What lies below the grids.
+  std::unique_ptr<Scene> vectors_;  ///< What lies above them, without points.
   std::optional<MapRequest> request_;
   std::vector<MapPoint> drawn_;  ///< Points of a line that is asked for.
   MapWindow window_;

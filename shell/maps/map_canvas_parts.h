@@ -38,10 +38,16 @@ struct MapCanvas::Layer {
 /// A text on paper of its own over the map.
 void DrawChip(QPainter& painter, const QRectF& chip, const QString& text, const QPalette& colors);
 
-/// Shapes and lines as last drawn, over the whole canvas; without a picture nothing was drawn yet.
-struct MapCanvas::VectorScene {
+/// Over the whole canvas; without a picture nothing was drawn yet.
+struct MapCanvas::Scene {
   QPixmap picture;
   MapWindow window;
+};
+
+struct MapCanvas::Backdrop {
+  std::shared_ptr<SharedLayer> layer;
+  double transparency = 0;
+  QFutureWatcher<SharedLayer::Picture> watcher;
 };
 
 /// The length that the scale bar shows, with its texts and its place.

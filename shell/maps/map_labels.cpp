@@ -38,33 +38,44 @@ bool LabelPlaces::IsTaken(const QRectF& place) const {
   });
 }
 
-bool LabelPlaces::Draw(QPainter& painter, const QRectF& place, const QString& text, const DrawnMap& map) {
+bool LabelPlaces::Draw(QPainter& painter, const QRectF& place, const QString& text, const DrawnMap& map,
+                       const std::optional<LabelLook>& look) {
   if (IsFull() || !limits_.contains(place) || IsTaken(place)) return false;
   ++names_;
   Take(place.adjusted(-2, -1, 2, 1));
   QColor edge = EdgeColor(map.isDark);
   edge.setAlpha(220);
   const QFontMetricsF metrics(painter.font());
-  DrawOutlinedText(painter, {place.left(), place.bottom() - metrics.descent() * 0.6}, text, InkColor(map.isDark), edge);
+  const QPointF baseline(place.left(), place.bottom() - metrics.descent() * 0.6);
+  if (look && look->isOpaque) {
+    painter.fillRect(place.adjusted(-2, -1, 2, 1), QColor(0xff, 0xff, 0xff));
+    painter.setPen(look->color);
+    painter.drawText(baseline, text);
+  } else {
+    // Around a chosen colour stands what it is read on.
+    if (look) edge = look->color.lightnessF() < 0.6F ? QColor(0xff, 0xff, 0xff, 220) : QColor(0x14, 0x16, 0x1a, 220);
+    DrawOutlinedText(painter, baseline, text, look ? look->color : InkColor(map.isDark), edge);
+  }
   return true;
 }
 
-bool LabelPlaces::DrawAround(QPainter& painter, QPointF marker, double radius, const QString& text,
-                             const DrawnMap& map) {
+bool LabelPlaces::DrawAround(QPainter& painter, QPointF marker, double radius, const QString& text, const DrawnMap& map,
+                             const std::optional<LabelLook>& look) {
   const QSizeF size = LabelSize(QFontMetricsF(painter.font()), text);
   const double gap = radius + 2.4 * map.zoom, slant = 0.7 * gap, w = size.width(), h = size.height();
   const std::array<QPointF, 8> corners{QPointF(gap, -h / 2),       QPointF(-gap - w, -h / 2),
                                        QPointF(-w / 2, -gap - h),  QPointF(-w / 2, gap),
                                        QPointF(slant, -slant - h), QPointF(-slant - w, -slant - h),
                                        QPointF(slant, slant),      QPointF(-slant - w, slant)};
-  return std::ranges::any_of(corners,
-                             [&](QPointF corner) { return Draw(painter, QRectF(marker + corner, size), text, map); });
+  return std::ranges::any_of(
+      corners, [&](QPointF corner) { return Draw(painter, QRectF(marker + corner, size), text, map, look); });
 }
 
-bool LabelPlaces::DrawAt(QPainter& painter, QPointF middle, const QString& text, const DrawnMap& map) {
+bool LabelPlaces::DrawAt(QPainter& painter, QPointF middle, const QString& text, const DrawnMap& map,
+                         const std::optional<LabelLook>& look) {
   QRectF place({}, LabelSize(QFontMetricsF(painter.font()), text));
   place.moveCenter(middle);
-  return Draw(painter, place, text, map);
+  return Draw(painter, place, text, map, look);
 }
 
 QSizeF LabelSize(const QFontMetricsF& metrics, const QString& text) {

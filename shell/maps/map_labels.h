@@ -8,6 +8,7 @@
 #include <QRectF>
 #include <QString>
 #include <array>
+#include <optional>
 #include <unordered_map>
 #include <vector>
 
@@ -15,6 +16,12 @@
 #include "shell/maps/map_drawing.h"
 
 namespace tervane {
+
+/// How a name is drawn, where that is not told by the theme.
+struct LabelLook {
+  QColor color;
+  bool isOpaque = false;  ///< It stands on paper of its own.
+};
 
 /// Where names may stand.
 class LabelPlaces {
@@ -29,9 +36,11 @@ class LabelPlaces {
 
   /// Draws a text at the first free of the places around a marker: beside, above, below, then the corners. False when
   /// there is none.
-  bool DrawAround(QPainter& painter, QPointF marker, double radius, const QString& text, const DrawnMap& map);
+  bool DrawAround(QPainter& painter, QPointF marker, double radius, const QString& text, const DrawnMap& map,
+                  const std::optional<LabelLook>& look = {});
   /// Draws a text in the middle of a place, if that is free.
-  bool DrawAt(QPainter& painter, QPointF middle, const QString& text, const DrawnMap& map);
+  bool DrawAt(QPainter& painter, QPointF middle, const QString& text, const DrawnMap& map,
+              const std::optional<LabelLook>& look = {});
 
  private:
   static constexpr std::size_t kMostNames = 400;
@@ -39,7 +48,8 @@ class LabelPlaces {
 
   template <class Visit>
   static bool AnyBucket(const QRectF& place, Visit visit);
-  bool Draw(QPainter& painter, const QRectF& place, const QString& text, const DrawnMap& map);
+  bool Draw(QPainter& painter, const QRectF& place, const QString& text, const DrawnMap& map,
+            const std::optional<LabelLook>& look);
 
   QRectF limits_;
   std::unordered_map<long long, std::vector<QRectF>> taken_;

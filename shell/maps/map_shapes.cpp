@@ -10,6 +10,7 @@
 #include <limits>
 #include <map>
 
+#include "shell/maps/map_styles.h"
 #include "shell/widgets/qt_text.h"
 
 namespace tervane {
@@ -121,6 +122,7 @@ ShapePicture::Room ShapePicture::RoomIn(std::size_t place) const {
 }
 
 void ShapePicture::Draw(QPainter& painter, const DrawnMap& map) const {
+  if (layer_.style) return StyledShapes{*layer_.shapes, around_, *layer_.style}.Draw(painter, map);
   if (ArePoints()) return DrawPoints(painter, map);
   if (!colors_.empty()) DrawFills(painter, map);
   DrawOutlines(painter, map);
@@ -186,6 +188,7 @@ void ShapePicture::DrawPoints(QPainter& painter, const DrawnMap& map) const {
 }
 
 void ShapePicture::DrawLabels(QPainter& painter, const DrawnMap& map, LabelPlaces& places) const {
+  if (layer_.style) return StyledShapes{*layer_.shapes, around_, *layer_.style}.DrawTexts(painter, map, places);
   const QFontMetricsF metrics(painter.font());
   const double metres = map.window.metresPerPixel;
   for (std::size_t i = 0; i < rooms_.size() && !places.IsFull(); ++i) {

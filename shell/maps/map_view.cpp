@@ -2,10 +2,18 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/maps/map_view.h"
 
+#include <QCheckBox>
+#include <QHBoxLayout>
+#include <QMenu>
+#include <QSlider>
+#include <QToolButton>
+#include <QWidgetAction>
 #include <utility>
 
 #include "platform/item_types.h"
 #include "shell/maps/map_canvas.h"
+#include "shell/widgets/qt_text.h"
+#include "shell/widgets/theme.h"
 
 namespace tervane {
 
@@ -20,6 +28,14 @@ MapView::MapView(Host& host, QWidget* parent) : PlotFrame(host, parent), canvas_
           [this](const QString& text) { SetStatus(text.isEmpty() ? canvas_->Summary() : text); });
   Hold({canvas_, [this](double factor) { canvas_->Zoom(factor); }, [this] { canvas_->Fit(); },
         [this](double pixelRatio) { return canvas_->Picture(pixelRatio); }});
+  layersButton_ = new QToolButton;
+  layersButton_->setText(tr("Layers"));
+  layersButton_->setToolTip(tr("Shows, hides and fades layers of the backdrop on this map"));
+  layersButton_->setPopupMode(QToolButton::InstantPopup);
+  layersButton_->setMenu(new QMenu(layersButton_));
+  layersButton_->hide();
+  connect(layersButton_->menu(), &QMenu::aboutToShow, this, &MapView::FillLayerMenu);
+  AddToRow(layersButton_);
   hillshade_ = AddCommand(tr("&Hillshade"), [this] {
     SetHillshade(hillshade_->isChecked());
     Outside().SetSetting(kHillshade, hillshade_->isChecked() ? "1" : "0");
@@ -29,9 +45,75 @@ MapView::MapView(Host& host, QWidget* parent) : PlotFrame(host, parent), canvas_
 }
 
 void MapView::SetHillshade(bool isOn) {
-  MapContent content = canvas_->Content();
-  LightSlopes(content, isOn);
-  canvas_->SetContent(std::move(content), &units_);
+  TakeFrame();
+  LightSlopes(content_, isOn);
+  canvas_->SetContent(AsLookedAt(), &units_);
+}
+
+void MapView::TakeFrame() {
+  content_.grids = canvas_->Content().grids;
+  content_.arrows = canvas_->Content().arrows;
+}
+
+// ---- Layers of the backdrop
+
+MapContent MapView::AsLookedAt() const {
+  MapContent shown = content_;
+  for (auto* layers : {&shown.below, &shown.above}) {
+    std::erase_if(*layers, [this](const BackdropLayer& layer) {
+      const auto look = looks_.find(layer.title);
+      return look != looks_.end() && !look->second.isShown;
+    });
+    for (BackdropLayer& layer : *layers)
+      if (const auto look = looks_.find(layer.title); look != looks_.end())
+        layer.transparency = look->second.transparency;
+  }
+  return shown;
+}
+
+void MapView::Look(const std::string& layer, const LayerLook& look) {
+  looks_[layer] = look;
+  TakeFrame();
+  canvas_->SetContent(AsLookedAt(), &units_);
+}
+
+std::vector<std::string> MapView::LayerTitles() const {
+  std::vector<std::string> titles;
+  for (const auto* layers : {&content_.above, &content_.below})
+    for (auto layer = layers->rbegin(); layer != layers->rend(); ++layer) titles.push_back(layer->title);
+  return titles;
+}
+
+void MapView::FillLayerMenu() {
+  QMenu* menu = layersButton_->menu();
+  menu->clear();
+  for (const std::string& title : LayerTitles()) {
+    const LayerLook look = looks_[title];
+    auto* row = new QWidget;
+    auto* layout = new QHBoxLayout(row);
+    const int margin = Theme::Get().Scaled(6);
+    layout->setContentsMargins(margin, margin / 2, margin, margin / 2);
+    auto* shown = new QCheckBox(Translated(title));
+    shown->setChecked(look.isShown);
+    auto* fade = new QSlider(Qt::Horizontal);
+    fade->setRange(0, 100);
+    fade->setValue(qRound(look.transparency * 100));
+    fade->setFixedWidth(Theme::Get().Scaled(110));
+    fade->setEnabled(look.isShown);
+    fade->setToolTip(tr("Transparency"));
+    fade->setAccessibleName(tr("Transparency of %1").arg(Translated(title)));
+    layout->addWidget(shown, 1);
+    layout->addWidget(fade);
+    const auto apply = [this, title, shown, fade] {
+      fade->setEnabled(shown->isChecked());
+      Look(title, {shown->isChecked(), fade->value() / 100.0});
+    };
+    connect(shown, &QCheckBox::toggled, this, apply);
+    connect(fade, &QSlider::valueChanged, this, apply);
+    auto* action = new QWidgetAction(menu);
+    action->setDefaultWidget(row);
+    menu->addAction(action);
+  }
 }
 
 void MapView::LightSlopes(MapContent& content, bool isOn) {
@@ -47,7 +129,10 @@ void MapView::LightSlopes(MapContent& content, bool isOn) {
 void MapView::Show(MapContent content, const DisplayUnits* units) {
   const DisplayUnits chosen = units ? *units : DisplayUnits();
   LightSlopes(content, hillshade_->isChecked());
-  if (isShown_ && chosen == units_ && LooksSame(content, canvas_->Content())) {
+  const MapContent& seen = canvas_->Content();
+  // Frames of another time may have been drawn meanwhile.
+  const bool isSeen = content.grids == seen.grids && content.arrows == seen.arrows;
+  if (isShown_ && isSeen && chosen == units_ && LooksSame(content, content_)) {
     canvas_->SetPicked(std::move(content.picked));
     canvas_->Ask(std::move(content.request));
     return;
@@ -55,7 +140,9 @@ void MapView::Show(MapContent content, const DisplayUnits* units) {
   isShown_ = true;
   units_ = chosen;
   std::optional<MapRequest> request = std::exchange(content.request, {});
-  canvas_->SetContent(std::move(content), units);
+  content_ = std::move(content);
+  layersButton_->setVisible(!content_.below.empty() || !content_.above.empty());
+  canvas_->SetContent(AsLookedAt(), units);
   canvas_->Ask(std::move(request));
   SetStatus(canvas_->Summary());
 }

@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <map>
+
 #include "forms/plots.h"
 #include "shell/widgets/plot_frame.h"
 
@@ -12,7 +14,8 @@ class MapCanvas;
 /// A map of a page with its status line and buttons.
 ///
 /// Drag moves it, the wheel zooms towards the pointer, Shift and drag zooms to a box, a double click or Home shows
-/// everything; + - and the arrows do the same from the keyboard.
+/// everything; + - and the arrows do the same from the keyboard. Layers of the backdrop are switched and made
+/// transparent here for the looking alone.
 class MapView : public PlotFrame {
   Q_OBJECT
 
@@ -26,11 +29,28 @@ class MapView : public PlotFrame {
   bool IsBusy() const override;
   MapCanvas& Canvas() const { return *canvas_; }
 
+  /// How a layer of the backdrop is looked at.
+  struct LayerLook {
+    bool isShown = true;
+    double transparency = 0;
+  };
+  void Look(const std::string& layer, const LayerLook& look);
+  /// The layers of the backdrop, the topmost first.
+  std::vector<std::string> LayerTitles() const;
+
  private:
   /// Lights the slopes of elevations, or no longer.
   void SetHillshade(bool isOn);
   void LightSlopes(MapContent& content, bool isOn);
+  /// Frames of other times are drawn behind our back.
+  void TakeFrame();
+  /// The content as the user looks at it.
+  MapContent AsLookedAt() const;
+  void FillLayerMenu();
 
+  MapContent content_;
+  std::map<std::string, LayerLook> looks_;  ///< By the layer's title; those that were changed.
+  QToolButton* layersButton_;
   MapCanvas* canvas_;
   QAction* hillshade_;
   DisplayUnits units_;

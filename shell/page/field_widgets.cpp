@@ -1,6 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <QAction>
+#include <QColorDialog>
 #include <QContextMenuEvent>
 #include <QDropEvent>
 #include <QHBoxLayout>
@@ -49,6 +50,7 @@ class LineWidget : public ControlWidget {
       row->insertWidget(1, browse);
       connect(browse, &QToolButton::clicked, this, &LineWidget::Browse);
     }
+    if (control.kind == ControlKind::Color) row->insertWidget(1, ColorButton());
     if (control.offers)
       OfferTexts(
           *edit_, [this] { return Offered(); }, [this] { Enter(edit_->text()); });
@@ -72,6 +74,7 @@ class LineWidget : public ControlWidget {
       edit_->setCursorPosition(edit_->isReadOnly() ? static_cast<int>(text.size()) : 0);
     }
     if (Described().kind == ControlKind::File || edit_->isReadOnly()) edit_->setToolTip(ToQt(Described().Text()));
+    if (color_) ShowColor();
   }
   void ShowRefused(bool refused) override {
     QPalette palette;
@@ -120,6 +123,7 @@ class LineWidget : public ControlWidget {
     switch (Described().kind) {
       case ControlKind::Integer:
       case ControlKind::Number:
+      case ControlKind::Color:
         return kNumberWidth;
       case ControlKind::Date:
         return kDateWidth;
@@ -155,6 +159,27 @@ class LineWidget : public ControlWidget {
     });
     return button;
   }
+  /// Shows the colour, and asks for another.
+  QWidget* ColorButton() {
+    color_ = new QToolButton;
+    color_->setToolTip(tr("Choose a colour"));
+    color_->setAccessibleName(tr("Colour of %1").arg(Translated(Described().label)));
+    connect(color_, &QToolButton::clicked, this, [this] {
+      Commit();
+      const QColor chosen = QColorDialog::getColor(QColor(ToQt(Described().Text())), edit_, tr("Choose a colour"));
+      if (chosen.isValid()) Enter(chosen.name());
+    });
+    return color_;
+  }
+  void ShowColor() {
+    QPixmap patch(color_->iconSize() * color_->devicePixelRatioF());
+    patch.fill(QColor(ToQt(Described().Text())));
+    QPainter painter(&patch);
+    painter.setPen(color_->palette().color(QPalette::Mid));
+    painter.drawRect(patch.rect().adjusted(0, 0, -1, -1));
+    painter.end();
+    color_->setIcon(QIcon(patch));
+  }
   void Browse() {
     Commit();
     if (Described().browse) {
@@ -167,6 +192,7 @@ class LineWidget : public ControlWidget {
   }
 
   QLineEdit* edit_;
+  QToolButton* color_ = nullptr;
   bool edited_ = false;
 };
 
@@ -217,6 +243,8 @@ std::unique_ptr<ControlWidget> MakeFieldWidget(CYbSEDlgBase& page, Control& cont
     case ControlKind::Date:
       return std::make_unique<LineWidget>(page, control);
     case ControlKind::File:
+      return std::make_unique<LineWidget>(page, control);
+    case ControlKind::Color:
       return std::make_unique<LineWidget>(page, control);
     case ControlKind::LongText:
       return std::make_unique<LongTextWidget>(page, control);
