@@ -14,17 +14,27 @@ const OverlayFileForm kGridStateForm{.nameKey = "ImageFileName",
                                      .riverKind = 3,
                                      .countsEvery = true,
                                      .tellsDisplay = true,
+                                     .imagesHaveUnit = true,
                                      .tellsPlacement = true,
+                                     .attribute = OverlayFileForm::Attribute::Always,
                                      .imageCornerPrefix = "wc_",
                                      .lineTitle = "Shape Polylines"};
 const OverlayFileForm kResultViewerForm{.nameKey = "DataFileName",
                                         .imageKind = 2,
                                         .shapeKind = 3,
                                         .fromLast = true,
+                                        .attribute = OverlayFileForm::Attribute::WhenGiven,
                                         .imageCornerPrefix = "",
                                         .lineTitle = "",
                                         .hasPoints = true,
                                         .hasTwoBackgrounds = true};
+const OverlayFileForm kNetworkEditorForm{.nameKey = "DataFileName",
+                                         .imageKind = 0,
+                                         .shapeKind = 1,
+                                         .imagesHaveUnit = true,
+                                         .imageCornerPrefix = "",
+                                         .lineTitle = "",
+                                         .joinsTexts = true};
 
 namespace {
 
@@ -40,7 +50,7 @@ class LayerWriter {
       PutImage(*image);
     else if (const auto* shape = dynamic_cast<const COverlayShapeKvf*>(&layer); shape && form_.shapeKind >= 0)
       PutShape(*shape);
-    else if (river && form_.riverKind >= 0 && !river->LayerFile().IsEmpty())
+    else if (river && form_.riverKind >= 0 && !river->ShownFile().IsEmpty())
       PutRiver(*river);
     else
       return false;
@@ -62,7 +72,7 @@ class LayerWriter {
 
   void PutImage(const COverlayBMPKvf& image) const {
     PutName(form_.imageKind, image.Filename);
-    if (form_.tellsPlacement) kvfPutParam(file_, "AxisUnit", 0);
+    if (form_.imagesHaveUnit) kvfPutParam(file_, "AxisUnit", 0);
     kvfAddSection(file_, "PROPERTIES");
     PutDisplay(image);
     const auto corner = [this](const char* name, double value) {
@@ -96,9 +106,18 @@ class LayerWriter {
     kvfPutParam(file_, "Text_Bk_Mode", isAsHeld ? background : kTransparent);
   }
 
+  void PutEitherText(const COverlayShapeKvf& shape) const {
+    kvfPutParam(file_, "Draw_Text", shape.ShowLineText != 0 || shape.ShowPointText != 0);
+    kvfPutParam(file_, "Text_Color_Style", 0);
+    PutColor("Text_Color", shape.LineTextColor);
+    kvfPutParam(file_, "Text_Bk_Mode", shape.LineTextBackground);
+  }
+
   void PutShape(const COverlayShapeKvf& shape) const {
     PutName(form_.shapeKind, shape.Filename);
-    if (form_.tellsPlacement || !shape.ItemDescr.empty()) kvfAddString(file_, shape.ItemDescr);
+    using Attribute = OverlayFileForm::Attribute;
+    if (form_.attribute == Attribute::Always || (form_.attribute == Attribute::WhenGiven && !shape.ItemDescr.empty()))
+      kvfAddString(file_, shape.ItemDescr);
     kvfPutParam(file_, "AxisUnit", shape.ShapeAxisUnit);
     kvfAddSection(file_, "PROPERTIES");
     kvfAddSection(file_, "Quarzel_Shape_Polygon_Object");
@@ -106,7 +125,10 @@ class LayerWriter {
     kvfPutParam(file_, "Line_Thickness", shape.LineThickness);
     kvfPutParam(file_, "Line_Style", shape.LineStyle);
     kvfPutParam(file_, "Line_Polygon_Style", shape.PolygonStyle);
-    PutTexts(shape.ShowLineText, shape.LineTextColorOption, shape.LineTextColor, shape.LineTextBackground);
+    if (form_.joinsTexts)
+      PutEitherText(shape);
+    else
+      PutTexts(shape.ShowLineText, shape.LineTextColorOption, shape.LineTextColor, shape.LineTextBackground);
     kvfEndSection(file_);
     if (form_.hasPoints) {
       kvfAddSection(file_, "Quarzel_Shape_Point_Object");
@@ -124,7 +146,7 @@ class LayerWriter {
   }
 
   void PutRiver(const COverlayRiverKvf& river) const {
-    PutName(form_.riverKind, river.FvrNwkFilename_Specified);
+    PutName(form_.riverKind, river.ShownFile());
     kvfPutParam(file_, "AxisUnit", 0);
     kvfAddSection(file_, "PROPERTIES");
     PutDisplay(river);

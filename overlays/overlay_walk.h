@@ -20,13 +20,16 @@ struct OverlayFileForm {
   bool fromLast = false;      ///< The layers stand from the last to the first.
   bool countsEvery = false;   ///< Also a layer that the file has no place for takes a number in the drawing order.
   bool tellsDisplay = false;  ///< Layers have a `Display` of their own; else parts of a shape tell whether it is shown.
-  bool tellsPlacement = false;         ///< Images have an axis unit, and shapes a conversion and a projection.
+  bool imagesHaveUnit = false;  ///< Images have an axis unit.
+  bool tellsPlacement = false;  ///< Shapes have a conversion and a projection.
+  enum class Attribute { Never, WhenGiven, Always } attribute = Attribute::Never;  ///< Behind the name of a shape file.
   std::string_view imageCornerPrefix;  ///< In front of `x0`, `y0`, `x1` and `y1`.
   std::string_view lineTitle;          ///< Of a shape's lines; empty for the title of the layer.
   bool hasPoints = false;              ///< Shapes have a section for points, too.
+  bool joinsTexts = false;             ///< Texts of points and of lines are one, in the colour of the latter.
   bool hasTwoBackgrounds = false;      ///< The background of texts is 1, opaque, or 2, transparent, and nothing else.
 };
-extern const OverlayFileForm kGridStateForm, kResultViewerForm;
+extern const OverlayFileForm kGridStateForm, kResultViewerForm, kNetworkEditorForm;
 
 /// Writes the layers of a list that the file has a place for. Where every layer counts, `counter` is the number of the
 /// latest layer in the drawing order, else that of the next one.

@@ -14,6 +14,7 @@
 #include "core/doc_version.h"
 #include "core/path.h"
 #include "document/coverage_board.h"
+#include "document/editor_exchange.h"
 #include "document/overview.h"
 #include "document/view_settings.h"
 #include "forms/page.h"
@@ -267,6 +268,8 @@ bool DocumentFrame::AnswerOnMap(const std::string& answer) {
   page_->Sync();
   return isAnswer;
 }
+
+bool DocumentFrame::Receive(const Message& message) { return AnswerEditor(session_->Document(), message, host_); }
 
 void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
   const PageClass* pageClass = PageClassOf(node);

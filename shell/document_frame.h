@@ -35,7 +35,7 @@ class QtHost;
 class RunPanel;
 
 /// One document in its tab: the trees at the left, the page in the middle, findings and logs below.
-class DocumentFrame : public QWidget {
+class DocumentFrame : public QWidget, public MessageReceiver {
   Q_OBJECT
 
  public:
@@ -106,6 +106,8 @@ class DocumentFrame : public QWidget {
   /// The branches of the trees that the user has opened and closed, to be given to a later window of the setup.
   QStringList Branches() const;
   void RestoreBranches(const QStringList& branches);
+  /// Answers other editors about the setup.
+  bool Receive(const Message& message) override;
 
  signals:
   /// The title, the place, or what can be undone is another one.
