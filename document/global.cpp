@@ -14,6 +14,7 @@
 #include "execution/execute_flags.h"
 #include "execution/processed_data.h"
 #include "overlays/overlays.h"
+#include "results/geo_scene.h"
 #include "results/result_nodes.h"
 #include "results/storing.h"
 #include "simspec/basic_parameters.h"
@@ -67,6 +68,8 @@ constexpr ChildRow Child(ImportantName<FoundAs> name) {
   return {Make<Node>, name.text};
 }
 
+CYbSEKvfBase* NewGeoScene(CGlobal& root) { return root.NewChild<CGeoScene3DKvf>(CGeoScene3DKvf::kOfModel); }
+
 constexpr std::array kChildren{
     Child<CFlowModelDocVersionKvf>(kDocVersion),
     Child<CViewSettingsKvf>(kViewSettings),
@@ -101,6 +104,7 @@ constexpr std::array kChildren{
     Child<CResultKvf>(kResult),
     Child<CResultsPostProcessingKvf>(kPostProcessing),
     Child<COverviewKvf>(kOverview),
+    ChildRow{MakeBy<NewGeoScene>, {}},
     Child<CCoverageKvf>(kCoverage),
 };
 

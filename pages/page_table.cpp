@@ -6,6 +6,7 @@
 #include "pages/document/overlay_pages.h"
 #include "pages/execution/processed_pages.h"
 #include "pages/results/detailed_series_pages.h"
+#include "pages/results/geo_scene_pages.h"
 #include "pages/results/statistics_pages.h"
 #include "pages/results/storing_pages.h"
 #include "pages/results/viewer_pages.h"
@@ -90,6 +91,7 @@ constexpr PageFile kFiles[] = {
     {"wqpt", ParticlePages},
     {"execution", ProcessedPages},
     {"results", StoringPages},
+    {"results", GeoScenePages},
     {"results", DetailedSeriesPages},
     {"results", ViewerPages},
     {"results", StatisticsPages},

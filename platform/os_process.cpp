@@ -151,6 +151,26 @@ DetachedProgram DetachedProgram::Start(const ProgramStart& start, std::error_cod
   return program;
 }
 
+bool DetachedProgram::AnnounceWhenReady(const std::string& message) {
+  constexpr int kTries = 200;
+  constexpr DWORD kPause = 50;
+  for (int i = 0; i < kTries; ++i) {
+    if (WaitForInputIdle(handle_, kPause) != 0) continue;
+    PostMessageW(HWND_BROADCAST, RegisterWindowMessageW(NativePath(message).wstring().c_str()), 0, 0);
+    return true;
+  }
+  return false;
+}
+
+std::string RegisteredServerFolder(const std::string& classId) {
+  const std::wstring key = L"CLSID\\" + NativePath(classId).wstring() + L"\\LocalServer32";
+  wchar_t program[MAX_PATH];
+  DWORD size = sizeof program;
+  if (RegGetValueW(HKEY_CLASSES_ROOT, key.c_str(), nullptr, RRF_RT_REG_SZ, nullptr, program, &size) != ERROR_SUCCESS)
+    return {};
+  return std::string(FolderOf(TextOfPath(std::wstring(program))));
+}
+
 std::optional<ProcessEnd> DetachedProgram::End() {
   if (!end_) end_ = EndOf(handle_);
   return end_;
@@ -355,6 +375,10 @@ DetachedProgram DetachedProgram::Start(const ProgramStart& start, std::error_cod
   program.id_ = static_cast<std::uint32_t>(Spawn(start, POSIX_SPAWN_SETSID, error));
   return program;
 }
+
+bool DetachedProgram::AnnounceWhenReady(const std::string& /*message*/) { return true; }
+
+std::string RegisteredServerFolder(const std::string& /*classId*/) { return {}; }
 
 std::optional<ProcessEnd> DetachedProgram::End() {
   int status = 0;

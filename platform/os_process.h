@@ -48,12 +48,19 @@ class DetachedProgram {
   static DetachedProgram Start(const ProgramStart& start, std::error_code& error);
   /// How it ended, or nothing while it runs. Never waits.
   std::optional<ProcessEnd> End();
+  /// Waits until the program's window takes input, for ten seconds at most, and then sends all windows the message of
+  /// that name. False when it never did. Where programs send no messages to windows there is nothing to wait for.
+  bool AnnounceWhenReady(const std::string& message);
 
  private:
   std::uint32_t id_ = 0;
   void* handle_ = nullptr;  ///< Of Windows.
   std::optional<ProcessEnd> end_;
 };
+
+/// The folder of the program that serves a class of objects, as it is registered with Windows: "{5EBEA2A1-...}". Empty
+/// where there is none, and on other systems.
+std::string RegisteredServerFolder(const std::string& classId);
 
 /// A program with all that it starts in turn, also what these leave behind, so that all can be ended together. A
 /// process has one such tree at a time, and starts nothing else.

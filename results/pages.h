@@ -16,5 +16,6 @@ inline constexpr PageClass kDetailedResultPage{"CResultDetailedTSDlg", 0};
 inline constexpr PageClass kDetailedRiverResultPage{"CResultFvrDetailedTSDlg", 0};
 inline constexpr PageClass kResultViewerPage{"CResultViewerDlg", 0};
 inline constexpr PageClass kRunStatisticsPage{"CRunStatisticsDlg", 0};
+inline constexpr PageClass kGeoScenePage{"CGeoScene3DDlg", 0};
 
 }  // namespace tervane

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "results/result_nodes.h"
 
+#include "results/geo_scene.h"
 #include "wqpt/extractions.h"
 
 namespace tervane {
@@ -29,6 +30,7 @@ CResultKvf::CResultKvf(CYbSEKvfBase* parent) : CYbSEKvfGroupBase("Simulation Res
   NewChild<DetailedResultKvf>(kDetailedResult);
   NewChild<CResultViewerKvf>();
   NewChild<DetailedResultKvf>(kDetailedRiverResult);
+  NewChild<CGeoScene3DKvf>(CGeoScene3DKvf::kOfResults);
 }
 
 CRunStatisticsKvf::CRunStatisticsKvf(CYbSEKvfBase* parent)
