@@ -1,0 +1,47 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "access/accessed_setup.h"
+
+#include "core/open_kvf.h"
+#include "document/setup_lock.h"
+#include "platform/paths.h"
+
+namespace tervane {
+
+bool AccessedSetup::Fail(std::string error) {
+  error_ = std::move(error);
+  if (host_) host_->ShowMessage(error_, Host::Icon::Error);
+  return false;
+}
+
+bool AccessedSetup::Open(const std::string& path) {
+  hooked_ = nullptr;
+  error_.clear();
+  document_ = std::make_unique<CFlowModelDoc>();
+  if (document_->OnOpenDocument(path)) return true;
+  std::string why = document_->Error();
+  // What was read of a file before it failed is no setup.
+  document_ = std::make_unique<CFlowModelDoc>();
+  return Fail(std::move(why));
+}
+
+bool AccessedSetup::Save(const std::string& path) {
+  error_.clear();
+  SetupLock lock;
+  if (lock.Take(path, SetupLock::Purpose::OneChange) == SetupLock::Outcome::Held)
+    return Fail(path + ": " + lock.Reason());
+  if (!hooked_) return document_->OnSaveDocument(path) || Fail(document_->Error());
+  const OpenKvf file(kvfCreate());
+  kvfGetErrorGlb();  // what an earlier writer left
+  file->folder = FolderOf(path);
+  hooked_->Save(file.get());
+  kvfWrite(file.get(), path);
+  return kvfGetErrorGlb() == kKvfNoError || Fail(kvfErrorText());
+}
+
+std::string AccessedSetup::Folder() const {
+  if (hooked_) return hooked_->SetupFolder();
+  return document_->PathName().empty() ? std::string() : std::string(FolderOf(document_->PathName()));
+}
+
+}  // namespace tervane

@@ -1,0 +1,42 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include "core/host.h"
+#include "document/flow_model_document.h"
+
+namespace tervane {
+
+/// A setup in the hands of another program: opened from a file, or the tree of somebody else.
+class AccessedSetup {
+ public:
+  /// What is to be told goes to `host`, which outlives the setup; without one it is only kept.
+  explicit AccessedSetup(Host* host = nullptr) : host_(host) {}
+
+  /// The tree: that of the file that was opened last, of somebody else, or a new one.
+  CGlobal& Root() const { return hooked_ ? *hooked_ : document_->Global(); }
+  /// Works on a tree from outside, which outlives this object.
+  void Hook(CGlobal* root) { hooked_ = root; }
+  /// Reads a setup with all that follows the reading. False, with the reason in `Error`, when it cannot be read; then
+  /// the tree is a new one.
+  bool Open(const std::string& path);
+  /// Writes the setup in one step. An editor or command that has the file open is not overrun. False with the reason in
+  /// `Error`, and the old file stands.
+  bool Save(const std::string& path);
+  const std::string& Error() const { return error_; }
+  /// The folder of the file; empty while there is none.
+  std::string Folder() const;
+
+ private:
+  bool Fail(std::string error);
+
+  Host* host_;
+  std::unique_ptr<CFlowModelDoc> document_ = std::make_unique<CFlowModelDoc>();
+  CGlobal* hooked_ = nullptr;
+  std::string error_;
+};
+
+}  // namespace tervane

@@ -1,0 +1,62 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The climate that drives a setup, as programs that make scenarios see it: values, series and grids by their number.
+#pragma once
+
+#include <array>
+#include <string>
+#include <vector>
+
+#include "core/kvf.h"
+#include "document/global.h"
+#include "surface/climate.h"
+
+namespace tervane {
+
+/// A quantity of climate.
+struct ClimateFamily {
+  const char* name;     ///< For people and on the command line.
+  const char* section;  ///< Of the definition file.
+  ImportantName<C2DStationBasedDataKvf> node;
+};
+inline constexpr std::array kClimateFamilies{
+    ClimateFamily{"precipitation", "Precipitation", kPrecipitation},
+    ClimateFamily{"evapotranspiration", "Evaporation", kReferenceEvapotranspiration},
+    ClimateFamily{"temperature", "Temperature", kAirTemperature},
+};
+
+/// A constant with the node that keeps it.
+struct ClimateValue {
+  float* value;
+  CYbSEKvfBase* node;
+};
+
+/// The inputs of one quantity, by its distribution in force. A setup without the quantity has none.
+class ClimateInputs {
+ public:
+  ClimateInputs(const CGlobal& root, const ClimateFamily& family);
+
+  C2DStationBasedDataKvf* Node() const { return node_; }
+  /// Constants: of the whole model, or of the stations that have one, in their order.
+  std::vector<ClimateValue> Values() const;
+  /// Files of series, likewise; those of stations also where they name no file.
+  std::vector<DataFileNode*> Series() const;
+  /// The same without those that name no file.
+  std::vector<DataFileNode*> NamedSeries() const;
+  /// The file of grids over time; null where there is none.
+  DataFileNode* Grid() const;
+
+ private:
+  C2DStationBasedDataKvf* node_;
+};
+
+/// The number of a station in its section; -1 for a node that is none.
+int NumberOfStation(const CYbSEKvfBase& node);
+
+/// Writes into an open section where a value stands in a setup: the names of sections down to its node, and its keys.
+/// `number` is that of a station, -1 where names are taken as they stand.
+void WriteClimatePlace(KvfFile* file, const CYbSEKvfBase& node, const char* keyword, int number,
+                       const std::vector<const char*>& keys);
+
+}  // namespace tervane
