@@ -7,9 +7,9 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/json.h"
 #include "cli/offers.h"
-#include "cli/setup_file.h"
+#include "cli/parts/json.h"
+#include "cli/parts/setup_file.h"
 #include "pages/findings.h"
 #include "platform/text.h"
 

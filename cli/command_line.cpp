@@ -15,7 +15,7 @@
 #include <fmt/format.h>
 
 #include "cli/offers.h"
-#include "cli/printable_stream.h"
+#include "cli/parts/printable_stream.h"
 #include "platform/os.h"
 #include "platform/text.h"
 #include "platform/units.h"
@@ -50,6 +50,7 @@ constexpr CommandFile kFiles[] = {
     {OfferValueCommands, {"get", "set"}},
     {OfferConvertCommand, {"convert"}},
     {OfferDiffCommand, {"diff"}},
+    {OfferClimateCommand},
     {OfferKeysCommand},
     {OfferRunCommand, {"run"}},
     {OfferDataCommands},

@@ -6,17 +6,9 @@
 #include <string>
 #include <vector>
 
-namespace tervane {
+#include "cli/parts/outcome.h"
 
-/// Exit statuses of the command line.
-enum ExitStatus : int {
-  kDone = 0,
-  kFindings = 1,  ///< Done, and there are findings or differences.
-  kCouldNot = 2,  ///< Not done; the reason went to the error stream.
-  /// Somebody asked the program to end, and what had to be brought to an end first is: to be followed by
-  /// `os::EndAsRequested`.
-  kInterrupted = 130,
-};
+namespace tervane {
 
 /// Runs `tervane` with these arguments, the program's name not among them.
 int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& out, std::ostream& err);

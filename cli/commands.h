@@ -2,30 +2,15 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <ostream>
 #include <string>
 #include <string_view>
-#include <vector>
+
+#include "cli/parts/outcome.h"
 
 namespace tervane {
 
 class KeyReference;
 struct KvfNode;
-
-/// Where a command writes: results to one, messages to the other.
-struct Streams {
-  std::ostream& out;
-  std::ostream& err;
-};
-
-/// Tells why a command could not do its work; gives its exit status.
-int Refuse(Streams streams, const std::string& reason);
-
-/// True, with a message, when the file exists and is not to be replaced.
-bool RefuseToReplace(const std::string& file, bool force, Streams streams);
-
-/// "; did you mean X?" for the name that comes nearest to what was typed, or nothing.
-std::string Suggestion(const std::string& typed, const std::vector<std::string>& names);
 
 /// The value of a key; gives an `ExitStatus`.
 int GetCommand(const std::string& file, const std::string& path, bool json, Streams streams);

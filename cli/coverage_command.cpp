@@ -9,9 +9,9 @@
 
 #include "cli/command_line.h"
 #include "cli/commands.h"
-#include "cli/json.h"
-#include "cli/setup_file.h"
-#include "cli/text_table.h"
+#include "cli/parts/json.h"
+#include "cli/parts/setup_file.h"
+#include "cli/parts/text_table.h"
 #include "data/datafile_request.h"
 #include "platform/paths.h"
 #include "platform/text.h"

@@ -7,9 +7,9 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/json.h"
 #include "cli/library_info.h"
 #include "cli/offers.h"
+#include "cli/parts/json.h"
 #include "cli/river_commands.h"
 #include "cli/template_info.h"
 #include "data/datafile.h"

@@ -5,10 +5,15 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/difference_text.h"
-#include "cli/json.h"
 #include "cli/offers.h"
-#include "cli/setup_file.h"
+#include "cli/parts/difference_text.h"
+#include "cli/parts/json.h"
+#include "cli/parts/setup_file.h"
+#include "core/kvf_writer.h"
+#include "core/open_kvf.h"
+#include "document/three_way_merge.h"
+#include "platform/files.h"
+#include "platform/paths.h"
 
 namespace tervane {
 
@@ -84,6 +89,76 @@ int DiffCommand(const std::string& from, const std::string& to, bool json, Strea
   return differences.empty() ? kDone : kFindings;
 }
 
+struct MergeOptions {
+  std::string base, mine, theirs, out;
+  bool force = false, json = false;
+};
+
+std::string ConflictJson(const MergeConflict& conflict) {
+  constexpr std::string_view kKinds[] = {"value", "deletedByMe", "deletedByThem", "order"};
+  return JsonObject({{"kind", JsonQuoted(kKinds[static_cast<std::size_t>(conflict.kind)])},
+                     {"path", JsonQuoted(conflict.path)},
+                     {"key", conflict.key.empty() ? "" : JsonQuoted(conflict.key)},
+                     {"base", JsonQuoted(conflict.base)},
+                     {"mine", JsonQuoted(conflict.mine)},
+                     {"theirs", JsonQuoted(conflict.theirs)}});
+}
+
+/// A setup as its file stands; null, told to the user, where it cannot be read.
+OpenKvf ReadAsItStands(const std::string& path, Streams streams) {
+  kvfGetErrorGlb();  // what an earlier reader left
+  OpenKvf file(kvfLoadFile(path, 0));
+  if (kvfGetErrorGlb() == kKvfNoError) return file;
+  fmt::print(streams.err, "{}: {}\n", path, kvfErrorText());
+  return nullptr;
+}
+
+int MergeCommand(const MergeOptions& options, Streams streams) {
+  // Into mine is what version control asks for.
+  const bool isIntoMine = options.out == options.mine || IsSameFile(options.out, options.mine);
+  if (isIntoMine ? RefuseHeld(options.out, options.force, streams)
+                 : RefuseToReplace(options.out, options.force, streams))
+    return kCouldNot;
+  const OpenKvf base = ReadAsItStands(options.base, streams), mine = ReadAsItStands(options.mine, streams),
+                theirs = ReadAsItStands(options.theirs, streams);
+  if (!base || !mine || !theirs) return kCouldNot;
+  const OpenKvf merged(kvfCreate());
+  const MergeResult result = MergeSetups(*base, *mine, *theirs, *merged);
+  if (!result.problem.empty()) return Refuse(streams, result.problem);
+  std::string text, problem;
+  if (!WriteKvfText(*merged, text, problem)) return Refuse(streams, problem);
+  CFlowModelDoc document;
+  if (!document.OpenText(text, options.out)) return Refuse(streams, document.Error());
+  if (const FileResult written = WriteFileAtomically(options.out, text); !written.Ok())
+    return Refuse(streams, written.error);
+  if (options.json) {
+    std::vector<std::string> conflicts;
+    for (const MergeConflict& conflict : result.conflicts) conflicts.push_back(ConflictJson(conflict));
+    fmt::print(streams.out, "{}\n",
+               JsonObject({{"taken", std::to_string(result.takenFromThem)}, {"conflicts", JsonArray(conflicts)}}));
+  } else {
+    for (const MergeConflict& conflict : result.conflicts) fmt::print(streams.out, "{}\n", conflict.Sentence());
+    fmt::print(streams.out, "{} changes taken from {}, {} conflicts\n", result.takenFromThem, options.theirs,
+               result.conflicts.size());
+  }
+  const std::size_t comments = mine->comments.size() + theirs->comments.size();
+  if (comments > 0)
+    fmt::print(streams.err, "{}: {} comments inside of the setups are not merged\n", options.out, comments);
+  return result.conflicts.empty() ? kDone : kFindings;
+}
+
+void OfferMerge(CommandOffers& offers) {
+  auto options = std::make_shared<MergeOptions>();
+  Command merge = offers.Offer("merge", "Put together two setups that were made from one",
+                               [offers, options] { return MergeCommand(*options, offers.Output()); });
+  merge.Add("BASE", options->base, "The setup that both were made from").Required();
+  merge.Add("MINE", options->mine, "One of them, which holds where both have changed a thing").Required();
+  merge.Add("THEIRS", options->theirs, "The other one").Required();
+  merge.Add("-o,--output", options->out, "The merged setup; it may be MINE").Required();
+  merge.AddFlag("--force", options->force, "Replaces a file of that name");
+  merge.AddFlag("--json", options->json, "As JSON");
+}
+
 }  // namespace
 
 void OfferDiffCommand(CommandOffers& offers) {
@@ -98,6 +173,7 @@ void OfferDiffCommand(CommandOffers& offers) {
   diff.Add("A", options->from, "The old setup").Required();
   diff.Add("B", options->to, "The new setup").Required();
   diff.AddFlag("--json", options->json, "As JSON");
+  OfferMerge(offers);
 }
 
 }  // namespace tervane

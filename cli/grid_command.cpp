@@ -4,7 +4,7 @@
 #include <fmt/ostream.h>
 
 #include "cli/offers.h"
-#include "cli/setup_file.h"
+#include "cli/parts/setup_file.h"
 #include "data/grid_files.h"
 #include "data/raster_import.h"
 #include "geometry/xyz_text.h"

@@ -8,7 +8,7 @@
 #include <fmt/ostream.h>
 
 #include "cli/offers.h"
-#include "cli/setup_file.h"
+#include "cli/parts/setup_file.h"
 #include "data/csv_reader.h"
 #include "forms/section_profile.h"
 #include "pages/parts/ground_column.h"

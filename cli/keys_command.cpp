@@ -5,8 +5,8 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/json.h"
 #include "cli/offers.h"
+#include "cli/parts/json.h"
 #include "core/doc_version.h"
 #include "core/list.h"
 #include "document/key_reference.h"

@@ -9,7 +9,7 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/json.h"
+#include "cli/parts/json.h"
 #include "libraries/library.h"
 #include "platform/text.h"
 

@@ -8,9 +8,9 @@
 #include <memory>
 #include <string>
 
-#include "cli/command.h"
 #include "cli/command_line.h"
 #include "cli/commands.h"
+#include "cli/parts/command.h"
 
 namespace tervane {
 
@@ -52,6 +52,7 @@ void OfferPageCommand(CommandOffers& offers);
 void OfferGroundCommands(CommandOffers& offers);
 void OfferValueCommands(CommandOffers& offers);
 void OfferDiffCommand(CommandOffers& offers);
+void OfferClimateCommand(CommandOffers& offers);
 void OfferKeysCommand(CommandOffers& offers);
 void OfferRunCommand(CommandOffers& offers);
 void OfferDataCommands(CommandOffers& offers);

@@ -7,10 +7,10 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/json.h"
 #include "cli/offers.h"
-#include "cli/setup_file.h"
-#include "cli/text_table.h"
+#include "cli/parts/json.h"
+#include "cli/parts/setup_file.h"
+#include "cli/parts/text_table.h"
 #include "data/datafile_request.h"
 #include "platform/paths.h"
 #include "platform/text.h"

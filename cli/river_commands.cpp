@@ -9,8 +9,8 @@
 #include <fmt/ostream.h>
 #include <fmt/ranges.h>
 
-#include "cli/json.h"
 #include "cli/offers.h"
+#include "cli/parts/json.h"
 #include "data/grid_files.h"
 #include "libraries/river_import.h"
 #include "platform/paths.h"

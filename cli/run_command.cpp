@@ -7,10 +7,10 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "cli/difference_text.h"
-#include "cli/json.h"
 #include "cli/offers.h"
-#include "cli/setup_file.h"
+#include "cli/parts/difference_text.h"
+#include "cli/parts/json.h"
+#include "cli/parts/setup_file.h"
 #include "document/run_inputs.h"
 #include "execution/engine_line.h"
 #include "execution/run_log.h"

@@ -8,7 +8,7 @@
 #include <fmt/ostream.h>
 #include <fmt/ranges.h>
 
-#include "cli/json.h"
+#include "cli/parts/json.h"
 #include "platform/text.h"
 #include "wqpt/kinetra_template.h"
 

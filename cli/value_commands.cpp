@@ -8,11 +8,11 @@
 #include <fmt/ostream.h>
 #include <fmt/ranges.h>
 
-#include "cli/json.h"
 #include "cli/offers.h"
-#include "cli/repeated_key.h"
-#include "cli/setup_file.h"
-#include "cli/typed_value.h"
+#include "cli/parts/json.h"
+#include "cli/parts/repeated_key.h"
+#include "cli/parts/setup_file.h"
+#include "cli/parts/typed_value.h"
 #include "core/kvf_writer.h"
 #include "document/key_reference.h"
 #include "document/setup_diff.h"

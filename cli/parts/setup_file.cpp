@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "cli/setup_file.h"
+#include "cli/parts/setup_file.h"
 
 #include <algorithm>
 #include <optional>

@@ -10,7 +10,7 @@
 #include <string_view>
 #include <vector>
 
-#include "cli/setup_file.h"
+#include "cli/parts/setup_file.h"
 
 namespace tervane {
 

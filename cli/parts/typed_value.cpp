@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "cli/typed_value.h"
+#include "cli/parts/typed_value.h"
 
 #include <charconv>
 #include <vector>

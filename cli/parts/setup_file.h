@@ -5,7 +5,7 @@
 #include <string>
 #include <unordered_map>
 
-#include "cli/commands.h"
+#include "cli/parts/outcome.h"
 #include "document/flow_model_document.h"
 #include "document/setup_lock.h"
 
