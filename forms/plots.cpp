@@ -26,7 +26,8 @@ void LetStandOut(MapContent& map, const Highlight& highlighted) {
 
 bool LooksSame(const MapContent& a, const MapContent& b) {
   return a.grids == b.grids && a.shapes == b.shapes && a.lines == b.lines && a.points == b.points &&
-         a.below == b.below && a.above == b.above && a.domain == b.domain && a.area == b.area && a.message == b.message && a.arrows == b.arrows;
+         a.below == b.below && a.above == b.above && a.domain == b.domain && a.area == b.area &&
+         a.message == b.message && a.arrows == b.arrows;
 }
 
 bool HasSameColors(const GridLayer& a, const GridLayer& b) {
