@@ -294,12 +294,27 @@ std::size_t ResultView::KeptFrames() const {
 }
 
 void ResultView::AddOverlays(MapContent& map) {
+  if (!setup_ || setup_->overlays.empty()) return;
+  // The file tells the whole backdrop.
+  map.below.clear();
+  map.above.clear();
   for (std::size_t i = 0; i < overlays_.size(); ++i) {
-    if (!overlays_[i]) continue;
-    if (auto shapes = NowOrAwaited(overlays_[i], map.awaited)) {
-      map.shapes.push_back({std::move(shapes), {}});
-      map.shapes.back().lineColor = setup_->overlays[i].lineColor;
+    const ViewedOverlay& overlay = setup_->overlays[i];
+    if (!overlay.isShown) continue;
+    BackdropLayer layer{.title = std::string(FileNameOf(overlay.path)), .drawn = {}};
+    if (overlay.kind == ViewedOverlay::Kind::Image) {
+      const DataArea& place = overlay.corners;
+      const ImageLayer image{overlay.path, StampOf(overlay.path), place.x0, place.x1, place.y0, place.y1};
+      if (!image.stamp.exists) continue;
+      layer.drawn = image;
+    } else if (auto shapes = overlays_[i] ? NowOrAwaited(overlays_[i], map.awaited) : nullptr) {
+      ShapeLayer drawn{.shapes = std::move(shapes)};
+      drawn.lineColor = overlay.lineColor;
+      layer.drawn = std::move(drawn);
+    } else {
+      continue;
     }
+    (overlay.isForeground ? map.above : map.below).push_back(std::move(layer));
   }
 }
 
@@ -318,8 +333,8 @@ MapContent ResultView::Map() {
   map.grids.push_back(*Colors());
   map.grids.back().grid = frame->grid;
   map.arrows = ArrowsOf(*frame);
-  AddOverlays(map);
   if (putOver_) putOver_(map);
+  AddOverlays(map);
   if (line_.size() > 1)
     map.lines.push_back({std::make_shared<const std::vector<MapLine>>(1, MapLine{.points = line_}), {.place = 0}});
   if (!cells_.empty()) {

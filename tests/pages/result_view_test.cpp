@@ -242,6 +242,11 @@ TEST_F(Results, ASetupOfTheViewerBringsItsPaletteFlowAndLayers) {
   setup.result = {path, 1, 1, 0.25, "Head [foot]", {{{1, 2, 3}, 100}, {{4, 5, 6}, 2000}}};
   setup.flow = ViewedFlow{path, 2, 3, 1, true};
   setup.overlays.push_back({ViewedOverlay::Kind::Shape, folder.File("gone.shp"), {}, 1000, true, 0, {}, true});
+  test::WriteShapes(folder.File("lakes.shp"), ShapeKind::Polygon, AttributeKind::Text, {std::string("Loch")});
+  setup.overlays.push_back({ViewedOverlay::Kind::Shape, folder.File("lakes.shp"), {}, 1000, true, 0x010203});
+  setup.overlays.push_back({ViewedOverlay::Kind::Shape, folder.File("lakes.shp"), {}, 1000, false});
+  setup.overlays.push_back(
+      {ViewedOverlay::Kind::Image, folder.Write("map.png", ""), {}, 0, true, 0, {1, 2, 3, 4}, true});
   DataFileView file(path, &units);
   ResultView view(file, &units, host);
   view.TakeSetup(setup);
@@ -253,7 +258,11 @@ TEST_F(Results, ASetupOfTheViewerBringsItsPaletteFlowAndLayers) {
   EXPECT_NEAR(map.grids.front().scale[0].upTo, 30.48, 1e-9);
   EXPECT_EQ(map.grids.front().scale[1].color, 0x040506U);
   EXPECT_TRUE(map.arrows);
-  EXPECT_THAT(map.shapes, testing::IsEmpty()) << "a layer that is gone is left out";
+  // What is hidden or gone is left out.
+  ASSERT_EQ(map.below.size(), 1U);
+  EXPECT_EQ(std::get<ShapeLayer>(map.below.front().drawn).lineColor, 0x010203U);
+  ASSERT_EQ(map.above.size(), 1U);
+  EXPECT_EQ(std::get<ImageLayer>(map.above.front().drawn).top, 4);
   view.ChoosePalette(0);
   EXPECT_THAT(MapOf(view).grids.front().scale, testing::IsEmpty());
 }
