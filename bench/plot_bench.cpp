@@ -90,6 +90,49 @@ void MeasureMap(const std::string& what, double rotation, bool isCodes) {
   }
 }
 
+/// 100 layers of the backdrop with a million points together.
+void MeasureBackdrop() {
+  MapContent content;
+  for (int layer = 0; layer < 100; ++layer) {
+    auto shapes = std::make_shared<CTvnShapeData>();
+    shapes->Create(ShapeKind::Line, {}, {});
+    for (int line = 0; line < 10; ++line) {
+      Shape shape;
+      shape.parts = {0};
+      for (int i = 0; i < 1000; ++i)
+        shape.points.push_back(
+            {400000 + i * 125.0, 5000000 + (layer * 10 + line) * 125.0 + 900 * std::sin(i / 9.0 + layer)});
+      shapes->AddShape(std::move(shape));
+    }
+    content.above.push_back(
+        {fmt::format("Layer {}", layer), ShapeLayer{.shapes = std::move(shapes), .style = ShapeStyle()}});
+  }
+  NobodyToAsk host;
+  MapView view(host), second(host);
+  for (MapView* each : {&view, &second}) {
+    each->resize(kSize);
+    each->show();
+  }
+  QApplication::processEvents();
+  const auto show = [&](MapView& map) {
+    return Milliseconds([&] {
+      map.Show(content, nullptr);
+      map.Canvas().WaitUntilReady();
+      map.Canvas().grab();
+    });
+  };
+  Report("100 layers with a million points: until the map is drawn", show(view), 100, "ms");
+  Report("100 layers with a million points: a second map of them", show(second), 100, "ms");
+  const double frames = Milliseconds([&] {
+    for (int i = 0; i < kFrames; ++i) {
+      view.Canvas().Pan({i % 2 == 0 ? 7.0 : -5.0, 3.0});
+      view.Canvas().repaint();
+    }
+  });
+  Report(fmt::format("100 layers: a frame of panning ({:.0f} a second)", 1000 * kFrames / frames), frames / kFrames,
+         1000.0 / 30, "ms");
+}
+
 /// 100 rivers of 1000 points each that wind over the area of the grid.
 std::shared_ptr<const std::vector<MapLine>> LargeNetwork() {
   auto network = std::make_shared<std::vector<MapLine>>(100);
@@ -370,6 +413,7 @@ void Measure() {
   MeasureMap("25 million cells, turned", 20, false);
   MeasureMap("25 million codes, turned", 20, true);
   MeasureNetwork();
+  MeasureBackdrop();
   MeasurePeer();
   MeasureInterpolation();
   MeasureViewer();
