@@ -5,8 +5,15 @@
 #include <algorithm>
 
 #include "platform/text.h"
+#include "surface/climate.h"
 
 namespace tervane {
+
+const std::array<ClimateFamily, kClimateFamilyCount> kClimateFamilies{
+    ClimateFamily{"precipitation", "Precipitation", kPrecipitation},
+    ClimateFamily{"evapotranspiration", "Evaporation", kReferenceEvapotranspiration},
+    ClimateFamily{"temperature", "Temperature", kAirTemperature},
+};
 
 namespace {
 

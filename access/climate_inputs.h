@@ -10,7 +10,7 @@
 
 #include "core/kvf.h"
 #include "document/global.h"
-#include "surface/climate.h"
+#include "spatial/stations.h"
 
 namespace tervane {
 
@@ -20,11 +20,9 @@ struct ClimateFamily {
   const char* section;  ///< Of the definition file.
   ImportantName<C2DStationBasedDataKvf> node;
 };
-inline constexpr std::array kClimateFamilies{
-    ClimateFamily{"precipitation", "Precipitation", kPrecipitation},
-    ClimateFamily{"evapotranspiration", "Evaporation", kReferenceEvapotranspiration},
-    ClimateFamily{"temperature", "Temperature", kAirTemperature},
-};
+/// Precipitation, evapotranspiration, temperature.
+inline constexpr std::size_t kClimateFamilyCount = 3;
+extern const std::array<ClimateFamily, kClimateFamilyCount> kClimateFamilies;
 
 /// A constant with the node that keeps it.
 struct ClimateValue {

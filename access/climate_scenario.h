@@ -32,7 +32,7 @@ FileResult WriteChangedClimate(const std::string& from, int item, const ClimateR
                                const std::string& to, ProgressPart progress = {});
 
 /// A rule for each of `kClimateFamilies`.
-using ClimateScenario = std::array<ClimateRule, kClimateFamilies.size()>;
+using ClimateScenario = std::array<ClimateRule, kClimateFamilyCount>;
 
 /// Changes the climate of a setup: constants in place, series and grids as new files in `folder`, which is made, and
 /// which the setup then names. Files that are there are not replaced. `changes` gets a sentence for each. The reason

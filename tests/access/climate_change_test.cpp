@@ -7,6 +7,7 @@
 #include "access/ole_date.h"
 #include "platform/files.h"
 #include "spatial/domain.h"
+#include "surface/climate.h"
 #include "tests/support/temp_folder.h"
 
 namespace tervane::climate_change_test {

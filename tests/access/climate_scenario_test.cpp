@@ -6,6 +6,7 @@
 
 #include "data/datafile_writer.h"
 #include "document/flow_model_document.h"
+#include "surface/climate.h"
 #include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 

@@ -243,8 +243,8 @@ TEST_F(Results, ASetupOfTheViewerBringsItsPaletteFlowAndLayers) {
   setup.flow = ViewedFlow{path, 2, 3, 1, true};
   setup.overlays.push_back({ViewedOverlay::Kind::Shape, folder.File("gone.shp"), {}, 1000, true, 0, {}, true});
   test::WriteShapes(folder.File("lakes.shp"), ShapeKind::Polygon, AttributeKind::Text, {std::string("Loch")});
-  setup.overlays.push_back({ViewedOverlay::Kind::Shape, folder.File("lakes.shp"), {}, 1000, true, 0x010203});
-  setup.overlays.push_back({ViewedOverlay::Kind::Shape, folder.File("lakes.shp"), {}, 1000, false});
+  setup.overlays.push_back({ViewedOverlay::Kind::Shape, folder.File("lakes.shp"), {}, 1000, true, 0x010203, {}});
+  setup.overlays.push_back({ViewedOverlay::Kind::Shape, folder.File("lakes.shp"), {}, 1000, false, 0, {}});
   setup.overlays.push_back(
       {ViewedOverlay::Kind::Image, folder.Write("map.png", ""), {}, 0, true, 0, {1, 2, 3, 4}, true});
   DataFileView file(path, &units);

@@ -115,7 +115,7 @@ TEST(ResultTypes, FeaturesBringInTypes) {
     for (const int code : one.without) EXPECT_TRUE(std::ranges::find(codes, code) == codes.end()) << code;
   }
   // Each of the four lists has its types alone, in the order of the table.
-  const RequirementMask river = kWaterMovement | kOverland | kRiver;
+  const RequirementMask river = kWaterMovement | kOverland | feature::kRiver;
   EXPECT_EQ(CodesOf(&ResultCatalogue::GetHiddenDatatypesforComponent, river),
             (std::vector{60, 92, 93, 94, 96, 249, 95, 347, 350, 351, 353, 354, 160, 161, 162, 165, 214, 215}));
   EXPECT_EQ(CodesOf(&ResultCatalogue::GetOpenMIDatatypesforComponent, kWaterMovement), (std::vector{10, 345, 346}));
@@ -208,14 +208,14 @@ TEST(ResultTypes, NamesOfFilesFollowTheIndex) {
 
 TEST(ResultTypes, LogicalsListShownAndThenHiddenTypes) {
   using namespace feature;
-  const RequirementMask logicals = kOverland | kRiver;
+  const RequirementMask logicals = kOverland | feature::kRiver;
   std::vector<int> expected = CodesOf(&ResultCatalogue::GetDatatypesforComponent, logicals | kWaterMovement);
   for (const int code : CodesOf(&ResultCatalogue::GetHiddenDatatypesforComponent, logicals | kWaterMovement))
     expected.push_back(code);
   expected.push_back(0);
   EXPECT_EQ(Own().GetDatatypesForLogicals_OneBigger(logicals).value, expected);
   EXPECT_EQ(Own().GetOpenMIDatatypesForLogicals_OneBigger({}).value, (std::vector{10, 345, 346, 0}));
-  EXPECT_EQ(Own().GetOpenMIDatatypesForWQLogicals_OneBigger(kRiver).value, (std::vector{289, 348, 0}));
+  EXPECT_EQ(Own().GetOpenMIDatatypesForWQLogicals_OneBigger(feature::kRiver).value, (std::vector{289, 348, 0}));
   const auto broken = Own().GetDatatypesForLogicals_OneBigger(kEvapotranspiration);
   EXPECT_EQ(broken.error, "ET requires UZ");
   EXPECT_TRUE(broken.value.empty());
