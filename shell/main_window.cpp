@@ -104,6 +104,7 @@ QStringList DroppedFiles(const QMimeData* data) {
 }  // namespace
 
 MainWindow::MainWindow(Program& program) : program_(program), host_(this, program.Settings()) {
+  host_.SetReceiver(this);
   setWindowIcon(Theme::Get().Icon("quarzel"));
   setAcceptDrops(true);
   tabs_ = new QTabWidget;
