@@ -76,26 +76,15 @@ int CClimateChange_TVN::GetLongLat(double& longitude, double& latitude) const {
 
 int CClimateChange_TVN::CountValues(Family family) {
   kvfAddSection(shared_->definition, kClimateFamilies[family].section);
-  const std::vector<ClimateValue> values = Inputs(family).Values();
-  for (const ClimateValue& value : values)
-    WriteClimatePlace(shared_->definition, *value.node, "Section_ConstValue", NumberOfStation(*value.node),
-                      {"FIXED_VALUE"});
-  return static_cast<int>(values.size());
+  return DefineValues(shared_->definition, Inputs(family));
 }
 
-int CClimateChange_TVN::CountSeries(Family family) {
-  const std::vector<DataFileNode*> series = Inputs(family).NamedSeries();
-  for (const DataFileNode* file : series)
-    WriteClimatePlace(shared_->definition, *file, "Section_TimeSeries", NumberOfStation(*file->GetParent()),
-                      {"FILE_NAME", "ITEM_NUMBERS"});
-  return static_cast<int>(series.size());
-}
+int CClimateChange_TVN::CountSeries(Family family) { return DefineSeries(shared_->definition, Inputs(family)); }
 
 int CClimateChange_TVN::CountGrids(Family family) {
-  const DataFileNode* grid = Inputs(family).Grid();
-  if (grid) WriteClimatePlace(shared_->definition, *grid, "Section_GridTimeSeries", -1, {"FILE_NAME", "ITEM_NUMBERS"});
+  const int count = DefineGrids(shared_->definition, Inputs(family));
   kvfEndSection(shared_->definition);
-  return grid ? 1 : 0;
+  return count;
 }
 
 // ---- Values and files

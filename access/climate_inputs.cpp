@@ -66,24 +66,56 @@ DataFileNode* ClimateInputs::Grid() const {
   return file.File.IsEmpty() ? nullptr : &file;
 }
 
+// ---- Definitions
+
+namespace {
+
+/// The number of a station in its section; -1 for a node that is none.
 int NumberOfStation(const CYbSEKvfBase& node) {
   return dynamic_cast<const StationKvf*>(&node) ? node.GetNumberWhatAmI() : -1;
 }
 
-void WriteClimatePlace(KvfFile* file, const CYbSEKvfBase& node, const char* keyword, int number,
-                       const std::vector<const char*>& keys) {
+/// Of a station `owner` is the node of its number.
+void WritePlace(KvfFile* file, const CYbSEKvfBase& node, const CYbSEKvfBase& owner, const char* keyword,
+                const std::vector<const char*>& keys) {
+  const int number = NumberOfStation(owner);
   std::vector<const CYbSEKvfBase*> way;
   for (const CYbSEKvfBase* above = &node; above->GetParent(); above = above->GetParent()) way.push_back(above);
   kvfAddKeyword(file, keyword);
   for (auto step = way.rbegin(); step != way.rend(); ++step) {
     std::string name = (*step)->GetSectionName();
     if (name.empty()) continue;
+    // Without a station names are taken as they stand.
     if (number != -1) name = Replaced(name, "%d", std::to_string(number));
     kvfAddString(file, name);
     kvfAddInt(file, 1);
   }
   kvfAddKeyword(file, "Para");
   for (const char* key : keys) kvfAddString(file, key);
+}
+
+const std::vector<const char*> kFileKeys{"FILE_NAME", "ITEM_NUMBERS"};
+
+}  // namespace
+
+int DefineValues(KvfFile* definition, const ClimateInputs& inputs) {
+  const std::vector<ClimateValue> values = inputs.Values();
+  for (const ClimateValue& value : values)
+    WritePlace(definition, *value.node, *value.node, "Section_ConstValue", {"FIXED_VALUE"});
+  return static_cast<int>(values.size());
+}
+
+int DefineSeries(KvfFile* definition, const ClimateInputs& inputs) {
+  const std::vector<DataFileNode*> series = inputs.NamedSeries();
+  for (const DataFileNode* file : series)
+    WritePlace(definition, *file, *file->GetParent(), "Section_TimeSeries", kFileKeys);
+  return static_cast<int>(series.size());
+}
+
+int DefineGrids(KvfFile* definition, const ClimateInputs& inputs) {
+  const DataFileNode* grid = inputs.Grid();
+  if (grid) WritePlace(definition, *grid, *grid->GetParent(), "Section_GridTimeSeries", kFileKeys);
+  return grid ? 1 : 0;
 }
 
 }  // namespace tervane

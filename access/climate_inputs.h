@@ -49,12 +49,10 @@ class ClimateInputs {
   C2DStationBasedDataKvf* node_;
 };
 
-/// The number of a station in its section; -1 for a node that is none.
-int NumberOfStation(const CYbSEKvfBase& node);
-
-/// Writes into an open section where a value stands in a setup: the names of sections down to its node, and its keys.
-/// `number` is that of a station, -1 where names are taken as they stand.
-void WriteClimatePlace(KvfFile* file, const CYbSEKvfBase& node, const char* keyword, int number,
-                       const std::vector<const char*>& keys);
+// Each writes into an open section where its inputs stand in a setup: the names of sections down to the node, and its
+// keys. How many there are.
+int DefineValues(KvfFile* definition, const ClimateInputs& inputs);
+int DefineSeries(KvfFile* definition, const ClimateInputs& inputs);
+int DefineGrids(KvfFile* definition, const ClimateInputs& inputs);
 
 }  // namespace tervane

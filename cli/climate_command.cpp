@@ -58,13 +58,9 @@ void DefineAll(const CGlobal& root, KvfFile* file) {
   for (const ClimateFamily& family : kClimateFamilies) {
     const ClimateInputs inputs(root, family);
     kvfAddSection(file, family.section);
-    for (const ClimateValue& value : inputs.Values())
-      WriteClimatePlace(file, *value.node, "Section_ConstValue", NumberOfStation(*value.node), {"FIXED_VALUE"});
-    for (const DataFileNode* series : inputs.NamedSeries())
-      WriteClimatePlace(file, *series, "Section_TimeSeries", NumberOfStation(*series->GetParent()),
-                        {"FILE_NAME", "ITEM_NUMBERS"});
-    if (const DataFileNode* grid = inputs.Grid())
-      WriteClimatePlace(file, *grid, "Section_GridTimeSeries", -1, {"FILE_NAME", "ITEM_NUMBERS"});
+    DefineValues(file, inputs);
+    DefineSeries(file, inputs);
+    DefineGrids(file, inputs);
     kvfEndSection(file);
   }
   kvfEndSection(file);

@@ -17,6 +17,7 @@ namespace tervane {
 
 namespace {
 
+constexpr int kOwnFile = 1;  ///< Of rivers and wells; else they follow the setup.
 /// Titles in the tree follow what a layer shows.
 constexpr int kTitleChange = kDataChanged | kTreeRebuilt;
 
@@ -187,16 +188,21 @@ void DescribeShape(PageForm& form, COverlayItemKvf& item) {
   DescribeBackdropMap(form, item);
 }
 
+/// What follows the setup, or shows a file of its own.
+Control& DescribeSource(PageForm& form, const char* label, int& source, const char* fileLabel, FileName& file,
+                        const OverlayLayer& layer) {
+  form.Radio(label, source).Hint(kTitleChange);
+  Control& control = form.File(fileLabel, file).Hint(kTitleChange).EnabledWhen(Is(source, kOwnFile));
+  form.ReadOnlyText("Shown file:", [&layer] { return layer.ShownFile().Text(); });
+  return control;
+}
+
 void DescribeRiver(PageForm& form, COverlayItemKvf& item) {
   auto& n = LayerOf<COverlayRiverKvf>(form, item);
   DescribeDisplay(form, n);
-  form.Radio("River network", n.SourceFvrNwkType).Hint(kTitleChange);
-  form.File("River network file:", n.FvrNwkFilename_Specified)
+  DescribeSource(form, "River network", n.SourceFvrNwkType, "River network file:", n.FvrNwkFilename_Specified, n)
       .Filter("River Network Files (*.fvproj;*.fvnwk)|*.fvproj;*.fvnwk|All Files (*.*) |*.*||")
-      .DefaultExtension("fvnwk")
-      .Hint(kTitleChange)
-      .EnabledWhen(Is(n.SourceFvrNwkType, COverlayRiverKvf::kOwnFile));
-  form.ReadOnlyText("Shown file:", [&n] { return n.ShownFile().Text(); });
+      .DefaultExtension("fvnwk");
   form.Notice([&n] { return RiverFaults(n.DrawnFile()); });
   DescribeBackdropMap(form, item);
 }
@@ -204,13 +210,9 @@ void DescribeRiver(PageForm& form, COverlayItemKvf& item) {
 void DescribeWells(PageForm& form, COverlayItemKvf& item) {
   auto& n = LayerOf<COverlayWellKvf>(form, item);
   DescribeDisplay(form, n);
-  form.Radio("Wells", n.SourceWellType).Hint(kTitleChange);
-  form.File("Well file:", n.WellFilename)
+  DescribeSource(form, "Wells", n.SourceWellType, "Well file:", n.WellFilename, n)
       .Filter("Well Files (*.WEL) |*.WEL|All Files (*.*) |*.*||")
-      .DefaultExtension("WEL")
-      .Hint(kTitleChange)
-      .EnabledWhen(Is(n.SourceWellType, COverlayWellKvf::kOwnFile));
-  form.ReadOnlyText("Shown file:", [&n] { return n.ShownFile().Text(); });
+      .DefaultExtension("WEL");
   form.Check("Show names", n.Lables);
   DescribeBackdropMap(form, item);
 }
