@@ -54,12 +54,22 @@ std::string JsonForm(PageForm& form) {
   return JsonArray(controls);
 }
 
+/// A place of the tree, or of what only old files hold; null, told to the user, where there is none.
+CYbSEKvfBase* FindShown(CFlowModelDoc& document, const std::string& typed, Streams streams) {
+  const SetupPath path = ParseSetupPath(typed);
+  for (const auto& retired : document.Global().Retired()) {
+    if (path.steps.empty() || path.steps.front().name != retired->GetSectionName()) continue;
+    if (CYbSEKvfBase* node = FindNode(*retired, {path.steps.begin() + 1, path.steps.end()})) return node;
+  }
+  return FindNodeOrReport(document, path, typed, streams);
+}
+
 int PageCommand(const std::string& file, const std::string& typed, bool json, Streams streams) {
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
   PrintLoadReportHint(document, streams);
   ReadProcessedData(document, streams);
-  CYbSEKvfBase* node = FindNodeOrReport(document, ParseSetupPath(typed), typed, streams);
+  CYbSEKvfBase* node = FindShown(document, typed, streams);
   if (!node) return kCouldNot;
   const PageClass* pageClass = PageClassOf(*node);
   NobodyToAsk host;

@@ -29,8 +29,10 @@ class CGlobal : public CTvnKvfGlobalBase {
 
   void Load(KvfNode* parentSection) override;
 
+  /// What old files hold and no new one: alive and registered, but no part of the tree any more.
+  const std::vector<std::shared_ptr<CYbSEKvfBase>>& Retired() const { return retired_; }
+
  private:
-  /// Alive and registered, but no part of the walk any more: read from old files, never written.
   std::vector<std::shared_ptr<CYbSEKvfBase>> retired_;
 };
 

@@ -134,10 +134,17 @@ void StyledShapes::DrawLines(QPainter& painter, const DrawnMap& map) const {
     if (style.fill == kVeiledPolygon) fill.setAlpha(80);
     painter.fillPath(rings, QBrush(fill, style.fill == kHatchedPolygon ? Qt::BDiagPattern : Qt::SolidPattern));
   }
-  for (const QPolygonF& line : lines) points += line.size();
-  constexpr qsizetype kVeryMany = 60'000;
+  double length = 0;
+  for (const QPolygonF& line : lines) {
+    points += line.size();
+    for (qsizetype i = 1; i < line.size(); ++i) length += (line[i] - line[i - 1]).manhattanLength();
+  }
+  // Many layers may be such, and of segments of a pixel or two nobody sees how their edges are drawn.
+  constexpr qsizetype kMany = 5'000, kVeryMany = 60'000;
+  constexpr double kShort = 3, kNarrow = 1.5;
   const double width = style.lineWidth * kPixelsOfMillimetre * map.zoom;
-  if (points > kVeryMany) return DrawFineLines(painter, lines, color);
+  const bool isDense = points > kMany && width < kNarrow && length < kShort * static_cast<double>(points);
+  if (isDense || points > kVeryMany) return DrawFineLines(painter, lines, color);
   if (style.dash == kSolidLine) return DrawPlainLines(painter, lines, color, width);
   painter.setPen(QPen(color, width, PenOf(style.dash), Qt::FlatCap));
   painter.setBrush(Qt::NoBrush);
