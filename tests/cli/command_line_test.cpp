@@ -224,9 +224,10 @@ TEST_F(CommandLine, PageShowsTheControlsOfANode) {
   EXPECT_THAT(Tervane({"page", file, "CIntroductionKvf"}).out, HasSubstr("browser \"\"\n  Tervane\n  This editor"));
   EXPECT_EQ(Tervane({"page", file, "FlowModelDocVersion"}).status, kCouldNot);
   // Lists that only old files have.
-  const std::string old = folder.Write(
-      "old.tvd", test::SetupText(10, "section SimSpec {\nModelType = 1\n}\nsection Evapotrans {\nsection "
-                                     "ETExtinctionDepth {\nYbSEKvfListItemCount = 2\n}\n}"));
+  const std::string old =
+      folder.Write("old.tvd", test::SetupText(10,
+                                              "section SimSpec {\nModelType = 1\n}\nsection Evapotrans {\nsection "
+                                              "ETExtinctionDepth {\nYbSEKvfListItemCount = 2\n}\n}"));
   EXPECT_THAT(Tervane({"page", old, "Evapotrans/ETExtinctionDepth"}).out, HasSubstr("table "));
   EXPECT_EQ(Tervane({"page", old, "Evapotrans/None"}).status, kCouldNot);
 }
