@@ -18,6 +18,8 @@ bool AccessedSetup::Open(const std::string& path) {
   hooked_ = nullptr;
   error_.clear();
   document_ = std::make_unique<CFlowModelDoc>();
+  // Before the reading, so that a change meanwhile is noticed.
+  stamp_ = StampOf(path);
   if (document_->OnOpenDocument(path)) return true;
   std::string why = document_->Error();
   // What was read of a file before it failed is no setup.
@@ -30,7 +32,16 @@ bool AccessedSetup::Save(const std::string& path) {
   SetupLock lock;
   if (lock.Take(path, SetupLock::Purpose::OneChange) == SetupLock::Outcome::Held)
     return Fail(path + ": " + lock.Reason());
-  if (!hooked_) return document_->OnSaveDocument(path) || Fail(document_->Error());
+  if (!hooked_) {
+    const std::string& read = document_->PathName();
+    const bool isSame = !read.empty() && (path == read || IsSameFile(path, read));
+    if (isSame && StampOf(path) != stamp_)
+      return Fail(path +
+                  ": another program has changed it since it was read; open it again, or save under another name");
+    if (!document_->OnSaveDocument(path)) return Fail(document_->Error());
+    stamp_ = StampOf(path);
+    return true;
+  }
   const OpenKvf file(kvfCreate());
   kvfGetErrorGlb();  // what an earlier writer left
   file->folder = FolderOf(path);

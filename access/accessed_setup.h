@@ -7,6 +7,7 @@
 
 #include "core/host.h"
 #include "document/flow_model_document.h"
+#include "platform/files.h"
 
 namespace tervane {
 
@@ -23,8 +24,8 @@ class AccessedSetup {
   /// Reads a setup with all that follows the reading. False, with the reason in `Error`, when it cannot be read; then
   /// the tree is a new one.
   bool Open(const std::string& path);
-  /// Writes the setup in one step. An editor or command that has the file open is not overrun. False with the reason in
-  /// `Error`, and the old file stands.
+  /// Writes the setup in one step. An editor or command that has the file open is not overrun, nor is what another
+  /// program has written into the file since it was read. False with the reason in `Error`, and the old file stands.
   bool Save(const std::string& path);
   const std::string& Error() const { return error_; }
   /// The folder of the file; empty while there is none.
@@ -36,6 +37,7 @@ class AccessedSetup {
   Host* host_;
   std::unique_ptr<CFlowModelDoc> document_ = std::make_unique<CFlowModelDoc>();
   CGlobal* hooked_ = nullptr;
+  FileStamp stamp_;  ///< Of the document's file, as it was read or saved.
   std::string error_;
 };
 

@@ -111,13 +111,20 @@ class ScenarioFiles {
     node.Choose(FileName::Picked(made, node.GetRoot()->SetupFolder()));
     return {};
   }
+  /// Leaves nothing of what was made.
+  void TakeBack() const {
+    std::error_code ignored;
+    for (const auto& [source, path] : made_) std::filesystem::remove(NativePath(path), ignored);
+    // Only an empty one goes.
+    std::filesystem::remove(NativePath(folder_), ignored);
+  }
 
  private:
   std::string MakeFolder() {
     if (isFolderMade_) return {};
     isFolderMade_ = true;
     std::error_code error;
-    std::filesystem::create_directories(folder_, error);
+    std::filesystem::create_directories(NativePath(folder_), error);
     return error ? fmt::format("{}: {}", folder_, error.message()) : std::string();
   }
   /// A name that no file has, by that of the file that is changed.
@@ -137,9 +144,10 @@ class ScenarioFiles {
 
 }  // namespace
 
-std::string ApplyClimateScenario(const CGlobal& root, const ClimateScenario& scenario, const std::string& folder,
-                                 std::vector<std::string>& changes) {
-  ScenarioFiles files(folder, changes);
+namespace {
+
+std::string ChangeAll(const CGlobal& root, const ClimateScenario& scenario, ScenarioFiles& files,
+                      std::vector<std::string>& changes) {
   for (std::size_t i = 0; i < kClimateFamilies.size(); ++i) {
     const ClimateFamily& family = kClimateFamilies[i];
     const ClimateRule& rule = scenario[i];
@@ -160,6 +168,16 @@ std::string ApplyClimateScenario(const CGlobal& root, const ClimateScenario& sce
         return problem;
   }
   return {};
+}
+
+}  // namespace
+
+std::string ApplyClimateScenario(const CGlobal& root, const ClimateScenario& scenario, const std::string& folder,
+                                 std::vector<std::string>& changes) {
+  ScenarioFiles files(folder, changes);
+  std::string problem = ChangeAll(root, scenario, files, changes);
+  if (!problem.empty()) files.TakeBack();
+  return problem;
 }
 
 }  // namespace tervane

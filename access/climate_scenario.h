@@ -36,7 +36,7 @@ using ClimateScenario = std::array<ClimateRule, kClimateFamilyCount>;
 
 /// Changes the climate of a setup: constants in place, series and grids as new files in `folder`, which is made, and
 /// which the setup then names. Files that are there are not replaced. `changes` gets a sentence for each. The reason
-/// why it failed, or empty; then the setup may name some of the new files, and is not to be saved.
+/// why it failed, or empty; then none of the new files is left, and the setup is not to be saved.
 std::string ApplyClimateScenario(const CGlobal& root, const ClimateScenario& scenario, const std::string& folder,
                                  std::vector<std::string>& changes);
 

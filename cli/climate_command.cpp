@@ -157,7 +157,7 @@ void OfferClimateCommand(CommandOffers& offers) {
   climate.AddTaken(
       "--shift",
       [options](const std::string& typed) { return TakeRule(typed, &ClimateRule::shift, true, options->scenario); },
-      "QUANTITY=BY: plus this, in mm/h or degrees Celsius; one number or one for each month");
+      "QUANTITY=BY: plus this, in mm/day or degrees Celsius; one number or one for each month");
   climate.Add("--folder", options->folder, "Where changed data files are written; NAME_climate beside the new setup");
   climate.Add("--definition", options->definition, "Writes where each value stands in the setup");
   climate.AddFlag("--force", options->force, "Replaces files of these names");

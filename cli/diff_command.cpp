@@ -116,7 +116,8 @@ OpenKvf ReadAsItStands(const std::string& path, Streams streams) {
 int MergeCommand(const MergeOptions& options, Streams streams) {
   // Into mine is what version control asks for.
   const bool isIntoMine = options.out == options.mine || IsSameFile(options.out, options.mine);
-  if (isIntoMine ? RefuseHeld(options.out, options.force, streams)
+  SetupLock lock;
+  if (isIntoMine ? !HoldSetup(lock, options.out, options.force, streams)
                  : RefuseToReplace(options.out, options.force, streams))
     return kCouldNot;
   const OpenKvf base = ReadAsItStands(options.base, streams), mine = ReadAsItStands(options.mine, streams),

@@ -97,6 +97,15 @@ TEST_F(Scenario, ChangesConstantsInPlaceAndCopiesOfFiles) {
   // A second one beside the first; months need a series.
   EXPECT_EQ(ApplyClimateScenario(root, scenario, folder.File("warm"), changes), "");
   EXPECT_THAT(ValuesOf(folder.File("warm/t_2.nds0")), ElementsAre(5, 6, 7));
+  // A file that cannot be read leaves nothing of those before it.
+  auto& evaporation = *root.Important(kReferenceEvapotranspiration);
+  evaporation.DistributionType = StationOwnerKvf::kUniform;
+  evaporation.Global().TYPE = CGlobalKvf::kTimeVarying;
+  evaporation.Global().SeriesFile().Choose(FileName(file, ""));
+  temperature.Global().SeriesFile().Choose(FileName(folder.File("gone.nds0"), ""));
+  scenario[1].factor.fill(2);
+  EXPECT_THAT(ApplyClimateScenario(root, scenario, folder.File("half"), changes), HasSubstr("gone.nds0"));
+  EXPECT_FALSE(FileExists(folder.File("half/t.nds0")));
   scenario[0].factor[3] = 9;
   EXPECT_THAT(ApplyClimateScenario(root, scenario, folder.File("warm"), changes), HasSubstr("a constant cannot"));
 }

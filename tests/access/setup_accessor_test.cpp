@@ -106,6 +106,17 @@ TEST(SetupAccessor, TellsWhatCannotBeReadOrWrittenAndLosesNothing) {
   EXPECT_THAT(setup.Error(), HasSubstr("open"));
   EXPECT_EQ(test::ReadFile(held), test::SetupText(14, ""));
 
+  // So is one that another program has written since.
+  const std::string shared = folder.Write("shared.tvd", test::SetupText(14, ""));
+  ASSERT_EQ(setup.OpenFile(shared), 1);
+  setup.SaveFile(shared);
+  EXPECT_EQ(setup.Error(), "");
+  const std::string theirs = test::SetupText(14, "section SimSpec {\nModelType = 1\n}");
+  folder.Write("shared.tvd", theirs);
+  host.Expect("another program has changed it", Host::Answer::Ok);
+  setup.SaveFile(shared);
+  EXPECT_EQ(test::ReadFile(shared), theirs);
+
   // The tree of somebody else is written as it is.
   CFlowModelDoc other;
   other.Root().Important(kSimulationPeriod)->SIMEND = {2031, 1, 1};
