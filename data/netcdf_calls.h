@@ -18,6 +18,7 @@ namespace tervane::netcdf {
   CALL(nc__create)                 \
   CALL(nc__open)                   \
   CALL(nc_close)                   \
+  CALL(nc_copy_att)                \
   CALL(nc_def_dim)                 \
   CALL(nc_def_var)                 \
   CALL(nc_def_var_chunking)        \
@@ -27,22 +28,30 @@ namespace tervane::netcdf {
   CALL(nc_get_att_double)          \
   CALL(nc_get_att_string)          \
   CALL(nc_get_att_text)            \
+  CALL(nc_get_var)                 \
   CALL(nc_get_var_double)          \
   CALL(nc_get_vara_double)         \
   CALL(nc_get_vara_float)          \
   CALL(nc_inq)                     \
   CALL(nc_inq_att)                 \
+  CALL(nc_inq_attname)             \
   CALL(nc_inq_dim)                 \
   CALL(nc_inq_dimids)              \
+  CALL(nc_inq_format)              \
   CALL(nc_inq_grps)                \
+  CALL(nc_inq_unlimdim)            \
   CALL(nc_inq_var)                 \
   CALL(nc_inq_var_chunking)        \
+  CALL(nc_inq_var_deflate)         \
+  CALL(nc_inq_vardimid)            \
   CALL(nc_inq_varid)               \
+  CALL(nc_inq_varnatts)            \
   CALL(nc_inq_varndims)            \
   CALL(nc_put_att_double)          \
   CALL(nc_put_att_float)           \
   CALL(nc_put_att_int)             \
   CALL(nc_put_att_text)            \
+  CALL(nc_put_var)                 \
   CALL(nc_put_var1_double)         \
   CALL(nc_put_var_double)          \
   CALL(nc_put_vara_double)         \
