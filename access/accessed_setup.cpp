@@ -27,6 +27,12 @@ bool AccessedSetup::Open(const std::string& path) {
   return Fail(std::move(why));
 }
 
+void AccessedSetup::Take(std::unique_ptr<CFlowModelDoc> document) {
+  hooked_ = nullptr;
+  error_.clear();
+  document_ = std::move(document);
+}
+
 bool AccessedSetup::Save(const std::string& path) {
   error_.clear();
   SetupLock lock;

@@ -19,6 +19,10 @@ class AccessedSetup {
 
   /// The tree: that of the file that was opened last, of somebody else, or a new one.
   CGlobal& Root() const { return hooked_ ? *hooked_ : document_->Global(); }
+  /// The document of the tree; not of one from outside.
+  CFlowModelDoc& Document() const { return *document_; }
+  /// Works on a setup that somebody else has made, which was never saved.
+  void Take(std::unique_ptr<CFlowModelDoc> document);
   /// Works on a tree from outside, which outlives this object.
   void Hook(CGlobal* root) { hooked_ = root; }
   /// Reads a setup with all that follows the reading. False, with the reason in `Error`, when it cannot be read; then
@@ -28,6 +32,8 @@ class AccessedSetup {
   /// program has written into the file since it was read. False with the reason in `Error`, and the old file stands.
   bool Save(const std::string& path);
   const std::string& Error() const { return error_; }
+  /// Tells a reason of the caller's; false.
+  bool Refuse(std::string why) { return Fail(std::move(why)); }
   /// The folder of the file; empty while there is none.
   std::string Folder() const;
 

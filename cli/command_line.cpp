@@ -17,6 +17,7 @@
 #include "cli/offers.h"
 #include "cli/parts/printable_stream.h"
 #include "platform/os.h"
+#include "platform/suggestion.h"
 #include "platform/text.h"
 #include "platform/units.h"
 #include "platform/version.h"

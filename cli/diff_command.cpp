@@ -5,13 +5,11 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
+#include "access/file_merge.h"
 #include "cli/offers.h"
 #include "cli/parts/difference_text.h"
 #include "cli/parts/json.h"
 #include "cli/parts/setup_file.h"
-#include "core/kvf_writer.h"
-#include "core/open_kvf.h"
-#include "document/three_way_merge.h"
 #include "platform/files.h"
 #include "platform/paths.h"
 
@@ -104,15 +102,6 @@ std::string ConflictJson(const MergeConflict& conflict) {
                      {"theirs", JsonQuoted(conflict.theirs)}});
 }
 
-/// A setup as its file stands; null, told to the user, where it cannot be read.
-OpenKvf ReadAsItStands(const std::string& path, Streams streams) {
-  kvfGetErrorGlb();  // what an earlier reader left
-  OpenKvf file(kvfLoadFile(path, 0));
-  if (kvfGetErrorGlb() == kKvfNoError) return file;
-  fmt::print(streams.err, "{}: {}\n", path, kvfErrorText());
-  return nullptr;
-}
-
 int MergeCommand(const MergeOptions& options, Streams streams) {
   // Into mine is what version control asks for.
   const bool isIntoMine = options.out == options.mine || IsSameFile(options.out, options.mine);
@@ -120,16 +109,8 @@ int MergeCommand(const MergeOptions& options, Streams streams) {
   if (isIntoMine ? !HoldSetup(lock, options.out, options.force, streams)
                  : RefuseToReplace(options.out, options.force, streams))
     return kCouldNot;
-  const OpenKvf base = ReadAsItStands(options.base, streams), mine = ReadAsItStands(options.mine, streams),
-                theirs = ReadAsItStands(options.theirs, streams);
-  if (!base || !mine || !theirs) return kCouldNot;
-  const OpenKvf merged(kvfCreate());
-  const MergeResult result = MergeSetups(*base, *mine, *theirs, *merged);
+  const auto [result, text, comments] = MergeSetupFiles(options.base, options.mine, options.theirs, options.out);
   if (!result.problem.empty()) return Refuse(streams, result.problem);
-  std::string text, problem;
-  if (!WriteKvfText(*merged, text, problem)) return Refuse(streams, problem);
-  CFlowModelDoc document;
-  if (!document.OpenText(text, options.out)) return Refuse(streams, document.Error());
   if (const FileResult written = WriteFileAtomically(options.out, text); !written.Ok())
     return Refuse(streams, written.error);
   if (options.json) {
@@ -142,7 +123,6 @@ int MergeCommand(const MergeOptions& options, Streams streams) {
     fmt::print(streams.out, "{} changes taken from {}, {} conflicts\n", result.takenFromThem, options.theirs,
                result.conflicts.size());
   }
-  const std::size_t comments = mine->comments.size() + theirs->comments.size();
   if (comments > 0)
     fmt::print(streams.err, "{}: {} comments inside of the setups are not merged\n", options.out, comments);
   return result.conflicts.empty() ? kDone : kFindings;

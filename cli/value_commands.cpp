@@ -8,14 +8,13 @@
 #include <fmt/ostream.h>
 #include <fmt/ranges.h>
 
+#include "access/repeated_key.h"
+#include "access/setup_change.h"
 #include "cli/offers.h"
 #include "cli/parts/json.h"
-#include "cli/parts/repeated_key.h"
 #include "cli/parts/setup_file.h"
-#include "cli/parts/typed_value.h"
 #include "core/kvf_writer.h"
 #include "document/key_reference.h"
-#include "document/setup_diff.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -62,70 +61,8 @@ struct ValueOptions {
   bool force = false, json = false;
 };
 
-/// One key and what it is to hold.
-struct Change {
-  std::string path, value;
-};
-
-/// The setup with a change; null, with a message, when it is refused.
-std::unique_ptr<CFlowModelDoc> Changed(CFlowModelDoc& document, const Change& change, const KeyReference& reference,
-                                       Streams streams) {
-  const auto refuse = [&](std::string_view why) -> std::unique_ptr<CFlowModelDoc> {
-    fmt::print(streams.err, "{} = {}: {}\n", change.path, change.value, why);
-    return nullptr;
-  };
-  const SetupPath path = ParseSetupPath(change.path);
-  const auto readAnew = [&](const WrittenSetup& written) -> std::unique_ptr<CFlowModelDoc> {
-    std::string text, error;
-    auto changed = std::make_unique<CFlowModelDoc>();
-    if (!WriteKvfText(written.File(), text, error)) return refuse(error);
-    if (!changed->OpenText(text, document.PathName())) return refuse(changed->Error());
-    return changed;
-  };
-  if (const auto repeated = FindRepeatedKey(document, path)) {
-    // The node takes one of the two.
-    for (const bool areNumbers : {true, false}) {
-      const WrittenSetup written(document);
-      if (!TakeValues(written, document, *repeated, change.value, areNumbers)) continue;
-      const std::vector<std::string> wanted = ValuesOf(written, document, *repeated);
-      auto changed = readAnew(written);
-      if (!changed) return nullptr;
-      if (ValuesOf(WrittenSetup(*changed), *changed, *repeated) != wanted) continue;
-      changed->Continue(document);
-      return changed;
-    }
-    return refuse("the setup does not take these values: texts, or whole numbers, separated by commas were expected");
-  }
-  const CYbSEKvfBase* node = FindNodeOrReport(document, path, change.path, streams);
-  if (!node) return nullptr;
-
-  // The value is put where the file would hold it, and that file is read as any other: so a key means here what it
-  // means to the nodes.
-  const WrittenSetup written(document);
-  KvfSection* section = written.SectionOf(*node);
-  KvfNode* key = section ? FindKeyOrReport(*section, path.key, change.path, streams) : nullptr;
-  if (!key) return nullptr;
-  const KeyInfo* info = reference.Find(PathOf(*node), Trimmed(path.key.name));
-  if (const std::string expected = TakeTyped(change.value, info, *section, *key); !expected.empty())
-    return refuse(expected + " was expected");
-  const std::string wanted = ComparedText(*key);
-  auto changed = readAnew(written);
-  if (!changed) return nullptr;
-  const WrittenSetup result(*changed);
-  const CYbSEKvfBase* changedNode = FindNode(changed->Root(), path.steps);
-  KvfSection* changedSection = changedNode ? result.SectionOf(*changedNode) : nullptr;
-  const KvfNode* taken = changedSection ? FindKvfNode(*changedSection, true, Trimmed(path.key.name),
-                                                      static_cast<std::size_t>(path.key.instance))
-                                        : nullptr;
-  if (!taken || ComparedText(*taken) != wanted)
-    return refuse(fmt::format("the setup does not take this value: it would be saved as {}",
-                              taken ? PlainValuesText(*taken) : "nothing"));
-  changed->Continue(document);
-  return changed;
-}
-
 /// What the setup finds of a key that was changed.
-void PrintFindings(const CFlowModelDoc& document, const Change& change, Streams streams) {
+void PrintFindings(const CFlowModelDoc& document, const TypedChange& change, Streams streams) {
   const SetupPath path = ParseSetupPath(change.path);
   const CYbSEKvfBase* node = FindNode(document.Root(), path.steps);
   if (!node) return;
@@ -135,20 +72,20 @@ void PrintFindings(const CFlowModelDoc& document, const Change& change, Streams 
                  finding.detail.empty() ? std::string() : fmt::format(" ({})", OneLine(finding.detail)));
 }
 
-int SetCommand(const std::string& file, const std::vector<Change>& changes, bool force, Streams streams) {
+int SetCommand(const std::string& file, const std::vector<TypedChange>& changes, bool force, Streams streams) {
   SetupLock lock;
   if (!HoldSetup(lock, file, force, streams)) return kCouldNot;
   auto document = std::make_unique<CFlowModelDoc>();
   if (!OpenSetup(*document, file, streams)) return kCouldNot;
   PrintLoadReport(*document, streams);
-  const KeyReference reference;
-  for (const Change& change : changes) {
-    document = Changed(*document, change, reference, streams);
-    if (!document) return kCouldNot;
+  for (const TypedChange& change : changes) {
+    std::string problem;
+    document = ReadWithChange(*document, change, problem);
+    if (!document) return Refuse(streams, problem);
   }
   if (!document->OnSaveDocument(file)) return Refuse(streams, document->Error());
   for (const std::string& note : document->SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
-  for (const Change& change : changes) PrintFindings(*document, change, streams);
+  for (const TypedChange& change : changes) PrintFindings(*document, change, streams);
   return kDone;
 }
 
@@ -193,7 +130,7 @@ void OfferValueCommands(CommandOffers& offers) {
   Command set = offers.Offer("set", "Change the values of keys and save the setup", [offers, options] {
     if (options->more.size() % 2 != 0)
       return Refuse(offers.Output(), fmt::format("{}: a value was expected behind this key", options->more.back()));
-    std::vector<Change> changes{{options->path, options->value}};
+    std::vector<TypedChange> changes{{options->path, options->value}};
     for (std::size_t i = 0; i < options->more.size(); i += 2)
       changes.push_back({options->more[i], options->more[i + 1]});
     return SetCommand(options->file, changes, options->force, offers.Output());

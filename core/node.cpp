@@ -9,13 +9,14 @@
 #include <fmt/format.h>
 
 #include "core/kvf_writer.h"
+#include "core/node_deaths.h"
 #include "platform/os.h"
 
 namespace tervane {
 
 namespace {
 
-std::atomic<std::uint64_t> nextSerial{1};
+std::atomic<std::uint64_t> nextSerial{1}, nodeDeaths{0};
 
 /// Whether the document that is read holds the section under its old name.
 bool BearsOldName(const auto& oldSection, const CYbSEKvfGlobalBase* root) {
@@ -33,8 +34,11 @@ CYbSEKvfBase::CYbSEKvfBase(std::string title, std::string sectionName, CYbSEKvfB
 }
 
 CYbSEKvfBase::~CYbSEKvfBase() {
+  nodeDeaths.fetch_add(1, std::memory_order_relaxed);
   if (isImportant_ && root_ && root_ != this) root_->UnregisterNode(this);
 }
+
+std::uint64_t NodeDeaths() { return nodeDeaths; }
 
 void CYbSEKvfBase::SetTexts(std::string title, std::string abbreviatedTitle) {
   title_ = std::move(title);

@@ -11,7 +11,8 @@
 #include "core/list.h"
 #include "core/open_kvf.h"
 #include "core/path.h"
-#include "spatial/zone_sync.h"
+#include "document/item_owner.h"
+#include "document/node_reading.h"
 
 namespace tervane {
 
@@ -44,58 +45,9 @@ class Written {
   KvfSection* target_;
 };
 
-/// The node that holds this one as an item, and what can be done with its items.
-class ItemOwner {
- public:
-  explicit ItemOwner(CYbSEKvfBase* owner)
-      : list_(dynamic_cast<CYbSEKvfListBaseInterface*>(owner)), zones_(dynamic_cast<CFMSEKvfBase*>(owner)) {}
-
-  CYbSEKvfBase* Node() const { return list_ ? static_cast<CYbSEKvfBase*>(list_) : zones_; }
-  bool Holds(const CYbSEKvfBase& node) const {
-    return list_ ? list_->GetNumberWhatIs(&node) > 0 : zones_ && dynamic_cast<const CFMSEKvfGroupBase*>(&node);
-  }
-  /// Null where no item can be made.
-  CYbSEKvfBase* Add() const {
-    if (list_) {
-      const int count = list_->GetItemCount();
-      list_->AddItemNode();
-      return list_->GetItemCount() > count ? list_->GetItemNode(count + 1) : nullptr;
-    }
-    std::shared_ptr<CFMSEKvfGroupBase> zone = zones_ ? zones_->CreateStationItem() : nullptr;
-    if (zone) zones_->AddChild(zone);
-    return zone.get();
-  }
-  void Remove(CYbSEKvfBase& item) const {
-    if (list_)
-      list_->DeleteItem(list_->GetNumberWhatIs(&item), 1);
-    else
-      zones_->RemoveChild(&item);
-  }
-
- private:
-  CYbSEKvfListBaseInterface* list_;
-  CFMSEKvfBase* zones_;
-};
-
 std::string PathAbove(const std::string& path) {
   const std::size_t end = path.rfind('/');
   return end == std::string::npos ? std::string() : path.substr(0, end);
-}
-
-/// Reads a node from a section that bears the name and the number that it has in another setup.
-void LoadFrom(CYbSEKvfBase& node, KvfSection& section) {
-  const std::string own = node.FormattedSectionName();
-  KvfName name = *section.name;
-  name.text = own.c_str();
-  name.length = static_cast<std::uint32_t>(own.size());
-  name.blanksBefore = name.blanksAfter = 0;
-  section.name = &name;
-  section.next = nullptr;
-  KvfSection alone;
-  alone.file = section.file;
-  alone.firstChild = alone.lastChild = &section;
-  alone.count = 1;
-  node.Load(&alone);
 }
 
 }  // namespace
@@ -128,7 +80,7 @@ CYbSEKvfBase* TakeValue(CFlowModelDoc& mine, const CFlowModelDoc& theirs, const 
   const int items = list ? list->GetItemCount() : 0;
   key->params = other->params;
   key->count = other->count;
-  node->ReadData(section);
+  ReadKeysAnew(*node, *section);
   const Written taken(mine, folder);
   const KvfNode* now = taken.Find(difference.path, difference.key);
   // The number of a list's items means nothing without the items.
@@ -136,7 +88,7 @@ CYbSEKvfBase* TakeValue(CFlowModelDoc& mine, const CFlowModelDoc& theirs, const 
   if (now && KvfValuesText(*now) == difference.to && !isOfList) return node;
   key->params = ownParams;
   key->count = ownCount;
-  node->ReadData(section);
+  ReadKeysAnew(*node, *section);
   problem = "the setup does not take this value here";
   return nullptr;
 }
@@ -169,7 +121,7 @@ CYbSEKvfBase* TakeItem(CFlowModelDoc& mine, const CFlowModelDoc& theirs, const S
     problem = "the setup does not take another item here";
     return nullptr;
   }
-  LoadFrom(*added, *section);
+  LoadAnew(*added, *section);
   return owner.Node();
 }
 

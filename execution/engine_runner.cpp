@@ -12,6 +12,7 @@
 #include "execution/engine_search.h"
 #include "execution/run_passport.h"
 #include "execution/run_state.h"
+#include "platform/beside_program.h"
 #include "platform/files.h"
 #include "platform/os.h"
 #include "platform/paths.h"
@@ -115,8 +116,13 @@ void EndLeftProcesses(os::ProgramTree& tree, RunState& state) {
 }  // namespace
 
 std::string RunnerProgram() {
-  const std::string program = os::ProgramPath();
-  return fmt::format("{}/tervane_runner{}", FolderOf(program), ExtensionOf(program) == ".exe" ? ".exe" : "");
+#ifdef _WIN32
+  constexpr std::string_view name = "tervane_runner.exe";
+#else
+  constexpr std::string_view name = "tervane_runner";
+#endif
+  const std::string found = FindBesideProgram(name);
+  return found.empty() ? fmt::format("{}/{}", FolderOf(os::CodePath()), name) : found;
 }
 
 int RunEngineAndWait(const std::vector<std::string>& arguments) {

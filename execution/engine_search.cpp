@@ -8,6 +8,7 @@
 
 #include <fmt/format.h>
 
+#include "platform/beside_program.h"
 #include "platform/files.h"
 #include "platform/os.h"
 #include "platform/os_process.h"
@@ -83,8 +84,9 @@ std::string WhyNoProgram(const std::string& path) {
 
 EnginePlaces EnginePlaces::Here(const std::string& setting) {
   const char* environment = std::getenv(kEnginesVariable);
-  const std::string program = os::ProgramPath();
-  return {setting, environment ? environment : "", program.empty() ? "" : fmt::format("{}/engines", FolderOf(program))};
+  const std::string found = FindBesideProgram("engines"), program = os::CodePath();
+  const std::string expected = program.empty() ? "" : fmt::format("{}/engines", FolderOf(program));
+  return {setting, environment ? environment : "", found.empty() ? expected : found};
 }
 
 std::string FindEngine(std::string_view name, const EnginePlaces& places, std::string& problem) {

@@ -5,6 +5,8 @@
 #include <filesystem>
 #include <utility>
 
+#include "platform/beside_program.h"
+
 #ifdef _WIN32
 #define NOMINMAX
 #define WIN32_LEAN_AND_MEAN
@@ -213,10 +215,23 @@ CLocaleScope::~CLocaleScope() {
   _configthreadlocale(perThread_);
 }
 
-std::string ProgramPath() {
+namespace {
+
+std::string PathOfModule(HMODULE module) {
   std::wstring path(32768, L'\0');
-  path.resize(GetModuleFileNameW(nullptr, path.data(), static_cast<DWORD>(path.size())));
+  path.resize(GetModuleFileNameW(module, path.data(), static_cast<DWORD>(path.size())));
   return TextOfPath(path);
+}
+
+}  // namespace
+
+std::string ProgramPath() { return PathOfModule(nullptr); }
+
+std::string CodePath() {
+  HMODULE module = nullptr;
+  GetModuleHandleExW(GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT,
+                     reinterpret_cast<LPCWSTR>(&CodePath), &module);
+  return PathOfModule(module);
 }
 
 void* LoadSharedLibrary(const std::string& path, std::string& reason) {
@@ -517,6 +532,17 @@ CLocaleScope::~CLocaleScope() {
 std::string ProgramPath() {
   std::error_code error;
   return std::filesystem::read_symlink("/proc/self/exe", error).string();
+}
+
+std::string CodePath() {
+  Dl_info code{};
+  // Of the program itself the name is what it was called by, which may be no path.
+  const bool isInLibrary = dladdr(reinterpret_cast<void*>(&CodePath), &code) != 0 && code.dli_fname != nullptr &&
+                           std::string_view(code.dli_fname).find(".so") != std::string_view::npos;
+  if (!isInLibrary) return ProgramPath();
+  std::error_code error;
+  const std::filesystem::path path = std::filesystem::canonical(code.dli_fname, error);
+  return error ? ProgramPath() : path.string();
 }
 
 void* LoadSharedLibrary(const std::string& path, std::string& reason) {

@@ -4,7 +4,7 @@
 
 #include <fmt/format.h>
 
-#include "platform/files.h"
+#include "platform/beside_program.h"
 #include "platform/os.h"
 #include "platform/paths.h"
 
@@ -20,10 +20,7 @@ std::string CannotBeLoaded(std::string_view what, std::string_view reason) {
 
 ProgramModule LoadProgramModule(std::string_view name, const char* entryName, std::string_view purpose) {
   const std::string fileName = os::SharedLibraryName(name);
-  const std::string folder(FolderOf(os::ProgramPath()));
-  for (const char* place : {"/", "/../", "/../bin/"}) {
-    const std::string path = folder + place + fileName;
-    if (!FileExists(path)) continue;
+  if (const std::string path = FindBesideProgram(fileName); !path.empty()) {
     std::string reason;
     void* const library = os::LoadSharedLibrary(path, reason);
     if (!library) return {nullptr, CannotBeLoaded(path, reason)};
@@ -31,7 +28,7 @@ ProgramModule LoadProgramModule(std::string_view name, const char* entryName, st
     return {entry, entry ? std::string() : OtherVersionOf(path)};
   }
   return {nullptr, fmt::format("{}, which {}, is missing beside the program in {}; install the program anew", fileName,
-                               purpose, folder)};
+                               purpose, FolderOf(os::CodePath()))};
 }
 
 std::string OtherVersionOf(std::string_view name) {

@@ -7,26 +7,12 @@
 
 #include "cli/parts/setup_file.h"
 #include "platform/files.h"
-#include "platform/text.h"
 
 namespace tervane {
 
 int Refuse(Streams streams, const std::string& reason) {
   fmt::print(streams.err, "{}\n", reason);
   return kCouldNot;
-}
-
-std::string Suggestion(const std::string& typed, const std::vector<std::string>& names) {
-  const std::string* nearest = nullptr;
-  std::size_t least = typed.size() / 3 + 2;
-  for (const std::string& name : names) {
-    if (EqualIgnoringCase(name, typed)) return fmt::format("; did you mean {}?", name);
-    const std::size_t distance = EditDistance(name, typed);
-    if (distance >= least) continue;
-    least = distance;
-    nearest = &name;
-  }
-  return nearest ? fmt::format("; did you mean {}?", *nearest) : std::string();
 }
 
 bool RefuseToReplace(const std::string& file, bool force, Streams streams) {

@@ -6,7 +6,6 @@
 
 #include <ostream>
 #include <string>
-#include <vector>
 
 namespace tervane {
 
@@ -31,8 +30,5 @@ int Refuse(Streams streams, const std::string& reason);
 
 /// True, with a message, when the file exists and is not to be replaced.
 bool RefuseToReplace(const std::string& file, bool force, Streams streams);
-
-/// "; did you mean X?" for the name that comes nearest to what was typed, or nothing.
-std::string Suggestion(const std::string& typed, const std::vector<std::string>& names);
 
 }  // namespace tervane

@@ -2,14 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "cli/parts/setup_file.h"
 
-#include <algorithm>
 #include <optional>
-#include <vector>
 
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
-#include "platform/paths.h"
+#include "access/setup_place.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -66,57 +64,19 @@ void ReadProcessedData(const CFlowModelDoc& document, Streams streams) {
 
 CYbSEKvfBase* FindNodeOrReport(CFlowModelDoc& document, const SetupPath& path, const std::string& typed,
                                Streams streams) {
-  if (!path.error.empty()) {
-    fmt::print(streams.err, "{}: {}\n", typed, path.error);
-    return nullptr;
-  }
-  CYbSEKvfBase* node = &document.Root();
-  for (const PathStep& step : path.steps) {
-    CYbSEKvfBase* child = FindChild(*node, step);
-    if (!child) {
-      std::vector<std::string> names;
-      for (CYbSEKvfBase* other = node->GetFirstChild(); other; other = node->GetNextChild(other))
-        names.push_back(StepName(*other));
-      fmt::print(streams.err, "{}: there is no {} here{} (tervane tree FILE --all --paths lists all places)\n", typed,
-                 PathName(step.name, step.instance), Suggestion(step.name, names));
-      return nullptr;
-    }
-    node = child;
-  }
+  std::string problem;
+  CYbSEKvfBase* node = FindNodeOrTell(document.Root(), path, typed, problem);
+  if (!node)
+    fmt::print(streams.err, "{}{}\n", problem,
+               path.error.empty() ? " (tervane tree FILE --all --paths lists all places)" : "");
   return node;
 }
 
-WrittenSetup::WrittenSetup(const CFlowModelDoc& document)
-    : file_(document.BuildFile(std::string(FolderOf(AbsoluteFromHere(document.PathName()))))),
-      target_(AsSection(FindKvfNode(file_->top, false, document.Root().GetTargetName()))) {}
-
-KvfSection* WrittenSetup::SectionOf(const CYbSEKvfBase& node) const {
-  const CYbSEKvfBase* parent = node.GetParent();
-  if (!parent) return target_;
-  if (const auto known = sections_.find(&node); known != sections_.end()) return known->second;
-  KvfSection* const section = SectionOf(*parent);
-  // Like sections are told apart by their place among each other.
-  std::unordered_map<std::string, std::size_t> instances;
-  for (CYbSEKvfBase* child = parent->GetFirstChild(); child; child = parent->GetNextChild(child)) {
-    const std::string name = child->FormattedSectionName();
-    const bool isInParents = !section || child->GetSectionName().empty();
-    sections_[child] = isInParents ? section : AsSection(FindKvfNode(*section, false, name, ++instances[name]));
-  }
-  return sections_[&node];
-}
-
 KvfNode* FindKeyOrReport(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams) {
-  if (key.name.empty()) {
-    fmt::print(streams.err, "{}: a key was expected behind the section, as in SimSpec:ModelType\n", typed);
-    return nullptr;
-  }
-  if (KvfNode* found = FindKvfNode(section, true, Trimmed(key.name), static_cast<std::size_t>(key.instance)))
-    return found;
-  std::vector<std::string> names;
-  for (const KvfNode* node = section.firstChild; node; node = node->next)
-    if (node->IsKeyword()) names.emplace_back(node->Name());
-  fmt::print(streams.err, "{}: there is no key {} here{}\n", typed, key.name, Suggestion(key.name, names));
-  return nullptr;
+  std::string problem;
+  KvfNode* found = FindKeyOrTell(section, key, typed, problem);
+  if (!found) fmt::print(streams.err, "{}\n", problem);
+  return found;
 }
 
 }  // namespace tervane

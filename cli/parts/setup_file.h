@@ -3,8 +3,8 @@
 #pragma once
 
 #include <string>
-#include <unordered_map>
 
+#include "access/written_setup.h"
 #include "cli/parts/outcome.h"
 #include "document/flow_model_document.h"
 #include "document/setup_lock.h"
@@ -34,26 +34,6 @@ void ReadProcessedData(const CFlowModelDoc& document, Streams streams);
 /// there.
 CYbSEKvfBase* FindNodeOrReport(CFlowModelDoc& document, const SetupPath& path, const std::string& typed,
                                Streams streams);
-
-/// A file as the document would save it in its own folder.
-class WrittenSetup {
- public:
-  explicit WrittenSetup(const CFlowModelDoc& document);
-  ~WrittenSetup() { kvfClose(&file_); }
-  WrittenSetup(const WrittenSetup&) = delete;
-  WrittenSetup& operator=(const WrittenSetup&) = delete;
-
-  KvfFile& File() const { return *file_; }
-  KvfSection& Target() const { return *target_; }
-  /// The section in which a node's keys stand.
-  KvfSection* SectionOf(const CYbSEKvfBase& node) const;
-
- private:
-  KvfFile* file_;
-  KvfSection* target_;
-  /// Of all children of the nodes that were asked for, so that asking for each of many siblings looks at each once.
-  mutable std::unordered_map<const CYbSEKvfBase*, KvfSection*> sections_;
-};
 
 /// The key that a path names in its section; null, with a message, when it is not there.
 KvfNode* FindKeyOrReport(KvfSection& section, const PathStep& key, const std::string& typed, Streams streams);

@@ -1,13 +1,17 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "cli/parts/typed_value.h"
+#include "access/typed_value.h"
 
+#include <algorithm>
 #include <charconv>
+#include <cmath>
+#include <limits>
 #include <vector>
 
 #include <fmt/format.h>
 
 #include "forms/entry.h"
+#include "platform/key_number.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -93,28 +97,67 @@ bool TakeDate(std::string_view typed, KvfNode& keyword) {
   return true;
 }
 
+/// A value of a program.
+std::string TakePlain(const PlainValue& value, KvfFile& file, KvfParam& param) {
+  if (const auto* text = std::get_if<std::string>(&value)) {
+    if (!param.IsText()) return param.type == KvfType::Bool ? "true or false" : "a number";
+    return TakePlain(std::string_view(*text), file, param);
+  }
+  const bool isTruth = std::holds_alternative<bool>(value);
+  const auto* whole = std::get_if<std::int64_t>(&value);
+  const double number = isTruth ? (std::get<bool>(value) ? 1 : 0)
+                        : whole ? static_cast<double>(*whole)
+                                : std::get<double>(value);
+  switch (param.type) {
+    case KvfType::Int:
+      if (std::trunc(number) != number || std::abs(number + 0.5) > 2147483648.0)
+        return "a whole number from -2147483648 to 2147483647";
+      param.asInt = static_cast<int>(number);
+      return "";
+    case KvfType::Float:
+      if (std::isfinite(number) && std::abs(number) > static_cast<double>(std::numeric_limits<float>::max()))
+        return "a number that fits a float";
+      param.asFloat = static_cast<float>(number);
+      return "";
+    case KvfType::Double:
+      param.asDouble = number;
+      return "";
+    case KvfType::Bool:
+      if (!isTruth && !SameNumber(number, 0) && !SameNumber(number, 1)) return "true or false";
+      param.asBool = !SameNumber(number, 0);
+      return "";
+    case KvfType::String:
+    case KvfType::Filename:
+      return "a text";
+  }
+  return "";
+}
+
 /// A list of any length. What counts its values follows.
-std::string TakeList(std::string_view typed, bool isOfNumbers, KvfSection& section, KvfNode& keyword) {
+template <class Values>
+std::string TakeList(const Values& values, bool isOfNumbers, KvfSection& section, KvfNode& keyword) {
   KvfFile& file = *section.file;
-  const std::vector<std::string_view> parts =
-      Trimmed(typed).empty() ? std::vector<std::string_view>() : Parts(typed, ",");
-  auto* params = file.nodes.New<KvfParam>(std::max<std::size_t>(parts.size(), 1));
-  for (std::size_t i = 0; i < parts.size(); ++i) {
+  auto* params = file.nodes.New<KvfParam>(std::max<std::size_t>(values.size(), 1));
+  for (std::size_t i = 0; i < values.size(); ++i) {
     params[i].type = isOfNumbers ? KvfType::Int : KvfType::String;
-    if (std::string expected = TakePlain(parts[i], file, params[i]); !expected.empty()) return expected;
+    if (std::string expected = TakePlain(values[i], file, params[i]); !expected.empty()) return expected;
   }
   keyword.params = params;
-  keyword.count = static_cast<std::uint32_t>(parts.size());
+  keyword.count = static_cast<std::uint32_t>(values.size());
   if (KvfNode* count = FindKvfNode(section, true, "ITEM_COUNT"); count && keyword.Name() == "ITEM_NUMBERS")
-    file.ReplaceParams(*count, KvfType::Int).asInt = static_cast<int>(parts.size());
+    file.ReplaceParams(*count, KvfType::Int).asInt = static_cast<int>(values.size());
   return {};
 }
+
+bool IsListOfNumbers(const KeyInfo* info) { return info && info->type == "int list"; }
+bool IsList(const KeyInfo* info) { return IsListOfNumbers(info) || (info && info->type == "string list"); }
 
 }  // namespace
 
 std::string TakeTyped(std::string_view typed, const KeyInfo* info, KvfSection& section, KvfNode& keyword) {
-  if (info && (info->type == "int list" || info->type == "string list"))
-    return TakeList(typed, info->type == "int list", section, keyword);
+  if (IsList(info))
+    return TakeList(Trimmed(typed).empty() ? std::vector<std::string_view>() : Parts(typed, ","), IsListOfNumbers(info),
+                    section, keyword);
   if (keyword.count == 1) return TakeOne(typed, info, *section.file, keyword.params[0]);
   // Numbers behind the name of a file are made when it is saved.
   if (keyword.params[0].type == KvfType::Filename) return TakeOne(typed, info, *section.file, keyword.params[0]);
@@ -127,6 +170,36 @@ std::string TakeTyped(std::string_view typed, const KeyInfo* info, KvfSection& s
   for (std::uint32_t i = 0; i < keyword.count; ++i)
     if (std::string expected = TakePlain(parts[i], *section.file, keyword.params[i]); !expected.empty())
       return expected;
+  return {};
+}
+
+PlainValue PlainValueOf(const KvfParam& param) {
+  switch (param.type) {
+    case KvfType::Int:
+      return std::int64_t{param.asInt};
+    case KvfType::Float:
+      return static_cast<double>(param.asFloat);
+    case KvfType::Double:
+      return param.asDouble;
+    case KvfType::Bool:
+      return param.asBool;
+    case KvfType::String:
+    case KvfType::Filename:
+      return std::string(param.Text());
+  }
+  return {};
+}
+
+std::string TakePlainValues(std::span<const PlainValue> values, const KeyInfo* info, KvfSection& section,
+                            KvfNode& keyword) {
+  if (IsList(info)) return TakeList(values, IsListOfNumbers(info), section, keyword);
+  // Numbers behind the name of a file are made when it is saved.
+  const std::size_t count = keyword.count > 0 && keyword.params[0].type == KvfType::Filename ? 1 : keyword.count;
+  if (values.size() != count) return count == 1 ? std::string("one value") : fmt::format("{} values", count);
+  std::vector<KvfParam> taken(keyword.params, keyword.params + count);
+  for (std::size_t i = 0; i < count; ++i)
+    if (std::string expected = TakePlain(values[i], *section.file, taken[i]); !expected.empty()) return expected;
+  std::ranges::copy(taken, keyword.params);
   return {};
 }
 

@@ -10,7 +10,7 @@
 #include <string_view>
 #include <vector>
 
-#include "cli/parts/setup_file.h"
+#include "access/written_setup.h"
 
 namespace tervane {
 

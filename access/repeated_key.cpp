@@ -1,6 +1,6 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "cli/parts/repeated_key.h"
+#include "access/repeated_key.h"
 
 #include "core/kvf_writer.h"
 #include "forms/entry.h"
