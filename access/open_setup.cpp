@@ -36,23 +36,22 @@ bool OpenSetup::Save(const std::string& path) {
   return to.empty() ? setup_->Refuse("the setup was never saved: a path was expected") : setup_->Save(to);
 }
 
-std::unique_ptr<OpenSetup> OpenSetup::Copy(std::string& problem) const {
+bool OpenSetup::CopyTo(OpenSetup& copy, std::string& problem) const {
   std::string text;
   const std::string& folder = Root().SetupFolder();
-  if (!Document().BuildText(folder, text, problem)) return nullptr;
+  if (!Document().BuildText(folder, text, problem)) return false;
   auto document = std::make_unique<CFlowModelDoc>();
   // The path stands for the folder from which names of files start.
   const std::string& path = Document().PathName();
   if (!document->OpenText(text, path.empty() ? "copy.tvd" : path)) {
     problem = document->Error();
-    return nullptr;
+    return false;
   }
   document->BecomeNew();
-  auto copy = std::make_unique<OpenSetup>();
-  copy->root_->Drop();
-  copy->setup_->Take(std::move(document));
-  copy->Begin();
-  return copy;
+  copy.root_->Drop();
+  copy.setup_->Take(std::move(document));
+  copy.Begin();
+  return true;
 }
 
 std::shared_ptr<HeldNode> OpenSetup::Hold(CYbSEKvfBase& node) const {

@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <atomic>
 #include <memory>
 #include <string>
 #include <unordered_map>
@@ -15,8 +14,7 @@
 
 namespace tervane {
 
-/// A setup as programs in other languages drive it: nodes that they hold, keys by path, items of lists. Only one thread
-/// may use it at a time.
+/// A setup as programs in other languages drive it: nodes that they hold, keys by path, items of lists.
 class OpenSetup {
  public:
   OpenSetup();
@@ -29,8 +27,8 @@ class OpenSetup {
   /// As `AccessedSetup::Save`; an empty path is that of the setup.
   bool Save(const std::string& path);
   const std::string& Error() const { return setup_->Error(); }
-  /// Another setup that is alike and was never saved; null with the problem.
-  std::unique_ptr<OpenSetup> Copy(std::string& problem) const;
+  /// Makes another one alike, as a setup that was never saved. False with the problem, and then it stays as it was.
+  bool CopyTo(OpenSetup& copy, std::string& problem) const;
 
   CFlowModelDoc& Document() const { return setup_->Document(); }
   CGlobal& Root() const { return setup_->Root(); }
@@ -57,23 +55,6 @@ class OpenSetup {
   /// Validates the whole, and gives what is found, with what was met when the file was read.
   std::vector<SetupFinding> Validate();
 
-  /// One thread's use of a setup.
-  class Use {
-   public:
-    explicit Use(OpenSetup& setup) : setup_(setup), isBegun_(!setup.isInUse_.exchange(true)) {}
-    ~Use() {
-      if (isBegun_) setup_.isInUse_ = false;
-    }
-    Use(const Use&) = delete;
-    Use& operator=(const Use&) = delete;
-    /// False while another thread uses it.
-    bool IsBegun() const { return isBegun_; }
-
-   private:
-    OpenSetup& setup_;
-    bool isBegun_;
-  };
-
  private:
   void Begin();
 
@@ -82,7 +63,6 @@ class OpenSetup {
   std::shared_ptr<HeldNode> root_;
   std::unordered_map<std::string, Place> places_;
   std::uint64_t placesRevision_ = 0;
-  std::atomic<bool> isInUse_ = false;
 };
 
 }  // namespace tervane

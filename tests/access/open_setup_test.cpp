@@ -83,13 +83,13 @@ TEST(OpenSetup, ACopyIsAlikeAndGoesItsOwnWay) {
   OpenSetup setup;
   ASSERT_TRUE(setup.Open(folder.Write("a.tvd", test::SetupText(14, "")))) << setup.Error();
   std::string problem;
-  const auto copy = setup.Copy(problem);
-  ASSERT_TRUE(copy) << problem;
-  EXPECT_EQ(copy->Document().PathName(), "");
-  Add(*copy, "Species", "Name", "a");
+  OpenSetup copy;
+  ASSERT_TRUE(setup.CopyTo(copy, problem)) << problem;
+  EXPECT_EQ(copy.Document().PathName(), "");
+  Add(copy, "Species", "Name", "a");
   EXPECT_EQ(At(setup, "Species").GetChildCount(), 0);
-  EXPECT_FALSE(copy->Save(""));
-  EXPECT_TRUE(copy->Save(folder.File("b.tvd"))) << copy->Error();
+  EXPECT_FALSE(copy.Save(""));
+  EXPECT_TRUE(copy.Save(folder.File("b.tvd"))) << copy.Error();
 }
 
 TEST(OpenSetup, WhatAnEditorHoldsIsNotSaved) {
@@ -101,14 +101,6 @@ TEST(OpenSetup, WhatAnEditorHoldsIsNotSaved) {
   ASSERT_EQ(editor.Take(path), SetupLock::Outcome::Taken);
   EXPECT_FALSE(setup.Save(""));
   EXPECT_THAT(setup.Error(), HasSubstr("it is open in another window"));
-}
-
-TEST(OpenSetup, ServesOneAtATime) {
-  OpenSetup setup;
-  const OpenSetup::Use mine(setup);
-  EXPECT_TRUE(mine.IsBegun());
-  EXPECT_FALSE(OpenSetup::Use(setup).IsBegun());
-  EXPECT_FALSE(OpenSetup::Use(setup).IsBegun());
 }
 
 }  // namespace
