@@ -53,10 +53,10 @@ std::vector<SectionProfile::Screen> ScreensAlong(const SectionContent& content) 
 
 }  // namespace
 
-SectionProfile ProfileOf(const SectionContent& content, double step) {
+SectionProfile ProfileAt(const SectionContent& content, std::vector<SectionPoint> points) {
   SectionProfile profile;
-  if (content.IsEmpty()) return profile;
-  profile.points = PointsAlong(content.line, step);
+  if (!content.ground) return profile;
+  profile.points = std::move(points);
   profile.ground = ElevationsAlong(*content.ground, profile.points, std::vector<double>(profile.points.size(), kNone));
   std::vector<double> above = profile.ground;
   for (const SectionSurface& surface : content.surfaces) {
@@ -81,6 +81,12 @@ SectionProfile ProfileOf(const SectionContent& content, double step) {
     profile.curves.push_back(
         {curve.name, ElevationsAlong(curve.level, profile.points, profile.ground,
                                      curve.isStepped ? GridSampling::Nearest : GridSampling::Bilinear)});
+  return profile;
+}
+
+SectionProfile ProfileOf(const SectionContent& content, double step) {
+  if (content.IsEmpty()) return {};
+  SectionProfile profile = ProfileAt(content, PointsAlong(content.line, step));
   profile.screens = ScreensAlong(content);
   return profile;
 }

@@ -51,6 +51,8 @@ struct SectionProfile {
 
 /// Samples at a step in metres. Elevations in a unit that is no length count as metres.
 SectionProfile ProfileOf(const SectionContent& content, double step);
+/// The same at any places, whatever line was drawn, and without screens.
+SectionProfile ProfileAt(const SectionContent& content, std::vector<SectionPoint> points);
 /// The profile as a table in metres: a row of heads, and one for each sample; cells without a value are empty.
 std::vector<std::vector<std::string>> SectionRows(const SectionProfile& profile);
 /// A step that shows each cell and makes no more points than a screen has use for.

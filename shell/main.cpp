@@ -23,7 +23,10 @@
 #include "platform/version.h"
 #include "shell/document_frame.h"
 #include "shell/main_window.h"
+#include "shell/maps/map_view.h"
 #include "shell/program.h"
+#include "shell/relief/relief_canvas.h"
+#include "shell/relief/relief_window.h"
 #include "shell/widgets/plot_frame.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -34,10 +37,10 @@ using namespace tervane;
 
 struct Typed {
   std::vector<std::string> files;
-  std::string page, size, screenshot, appearance, dialog;
+  std::string page, size, screenshot, appearance, dialog, relief;
   std::vector<std::string> answers;
   double zoom = 0;
-  int delay = -1;
+  int delay = -1, slice = 0;
 };
 
 /// "1280x800"
@@ -92,6 +95,26 @@ int DrawDialog(MainWindow& window, const Typed& typed) {
   const bool isPressed = window.Frame() && window.Frame()->PressButton(typed.dialog);
   if (!isPressed) std::fprintf(stderr, "quarzel: %s: the page has no such button\n", typed.dialog.c_str());
   return status;
+}
+
+/// Draws the 3D view of the ground of the setup, or of the map that is shown.
+int DrawRelief(MainWindow& window, const Typed& typed) {
+  ReliefWindow* relief = nullptr;
+  if (typed.relief == "ground" && window.Frame()) {
+    relief = window.ShowGround(*window.Frame());
+  } else if (typed.relief == "map") {
+    for (MapView* map : window.findChildren<MapView*>())
+      if (map->isVisible()) relief = map->OpenRelief();
+  }
+  if (!relief) {
+    std::fprintf(stderr, "quarzel: there is nothing to show in 3D\n");
+    return 2;
+  }
+  while (relief->View().IsBusy()) QApplication::processEvents(QEventLoop::WaitForMoreEvents);
+  if (typed.slice > 0) relief->Slice(1, typed.slice / 100.0);
+  for (int i = 0; i < 3; ++i) QApplication::processEvents();
+  relief->View().Canvas().WaitUntilFine();
+  return SavePicture(*relief, typed.screenshot) ? 0 : 2;
 }
 
 /// Memory that is refused is told, and the program goes on with what it has.
@@ -156,6 +179,7 @@ int Run(const Typed& typed, QApplication& application) {
   while (isBusy() && !deadline.hasExpired()) application.processEvents(QEventLoop::WaitForMoreEvents);
   settle();
   if (!typed.dialog.empty()) return DrawDialog(window, typed);
+  if (!typed.relief.empty()) return DrawRelief(window, typed);
   return SavePicture(window, typed.screenshot) ? 0 : 2;
 }
 
@@ -181,6 +205,11 @@ int main(int argc, char** argv) {
   commandLine.add_option("--appearance", typed.appearance, "light or dark")->check(CLI::IsMember({"light", "dark"}));
   commandLine.add_option("--screenshot", typed.screenshot, "Draw the window into this picture and end");
   commandLine.add_option("--dialog", typed.dialog, "Draw the dialog that this button of the page opens");
+  commandLine
+      .add_option("--view3d", typed.relief, "Draw the 3D view of the setup's ground, or of the map that is shown")
+      ->check(CLI::IsMember({"ground", "map"}));
+  commandLine.add_option("--slice", typed.slice, "Of the 3D view: cut it from the south, by so many percent")
+      ->check(CLI::Range(0, 100));
   commandLine
       .add_option("--delay", typed.delay, "Draw it after so many milliseconds, whatever is still being computed")
       ->check(CLI::NonNegativeNumber);

@@ -27,6 +27,7 @@
 #include "shell/compare_view.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
+#include "shell/ground_window.h"
 #include "shell/library_tab.h"
 #include "shell/main_window.h"
 #include "shell/page/table_view.h"
@@ -154,6 +155,8 @@ void MainWindow::BuildMenus() {
                  [](DocumentFrame& frame) { GoToImportant(frame, kCoverage); });
   AddForDocument(tools, tr("What Is &Missing?"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_M),
                  [](DocumentFrame& frame) { frame.ShowWhatIsMissing(); });
+  AddForDocument(tools, tr("3D &View"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_G),
+                 [this](DocumentFrame& frame) { ShowGround(frame); });
   windowMenu_ = menuBar()->addMenu(tr("&Window"));
   connect(windowMenu_, &QMenu::aboutToShow, this, &MainWindow::FillWindowMenu);
   // Filled when it is opened; the keys work without that.
@@ -166,6 +169,8 @@ void MainWindow::BuildMenus() {
   addAction(commands_.back()->action);
   BuildHelpMenu();
 }
+
+ReliefWindow* MainWindow::ShowGround(DocumentFrame& frame) { return OpenGroundWindow(frame, host_, program_.Units()); }
 
 void MainWindow::BuildEditMenu() {
   QMenu* edit = menuBar()->addMenu(tr("&Edit"));

@@ -25,6 +25,7 @@ class EditSession;
 class LibraryTab;
 struct LibraryKind;
 class Program;
+class ReliefWindow;
 class TemplateTab;
 class WelcomePage;
 
@@ -55,6 +56,8 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   bool OpenLibrary(const LibraryKind& kind, const QString& path);
   /// Shows a process template in a tab of its own.
   bool ShowTemplate(const QString& path);
+  /// Shows the ground of a setup from the side, in a window of its own.
+  ReliefWindow* ShowGround(DocumentFrame& frame);
   /// Nobody is there to answer; see QtHost.
   void SetUnattended() { host_.SetUnattended(); }
   /// One of these, by the file's name.

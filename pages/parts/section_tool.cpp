@@ -38,11 +38,10 @@ void SectionTool::DescribeButtons(PageForm& form, const Condition& isOffered) {
 
 void SectionTool::DescribeSection(PageForm& form, std::function<SectionContent()> content, const Condition& isOffered) {
   form.Section([this, content = std::move(content)] {
-        SectionContent section;
-        section.message = "Draw a section on the map.";
-        if (!drawn_) return section;
-        section = content();
+        // Maps show the ground in 3D without a line, too.
+        SectionContent section = content();
         section.line = line_;
+        if (!drawn_) section.message = "Draw a section on the map.";
         return section;
       })
       .ShownWhen(Sentence("a section is drawn", [this] { return drawn_ != nullptr; }) && isOffered);

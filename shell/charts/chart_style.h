@@ -4,16 +4,9 @@
 // The looks that all charts have in common.
 #pragma once
 
-#include <QColor>
-
 class QCustomPlot;
 
 namespace tervane {
-
-/// Colours of curves that are told apart on white and on dark ground, also by people who confuse red and green.
-QColor CurveColor(std::size_t number, bool onDark);
-/// Quiet colours of layers of the ground, which lie beside each other.
-QColor LayerColor(std::size_t number, bool onDark);
 
 /// By how much a step of zooming enlarges.
 inline constexpr double kZoomStep = 1.5;

@@ -11,6 +11,7 @@
 #include "platform/item_types.h"
 #include "platform/text.h"
 #include "shell/charts/chart_style.h"
+#include "shell/widgets/layer_colors.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/shown_unit.h"
 #include "shell/widgets/theme.h"

@@ -13,6 +13,8 @@
 
 #include "shell/charts/chart_style.h"
 #include "shell/charts/section_bands.h"
+#include "shell/relief/relief_window.h"
+#include "shell/widgets/layer_colors.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/shown_unit.h"
 #include "shell/widgets/theme.h"
@@ -55,6 +57,11 @@ SectionView::SectionView(Host& host, QWidget* parent)
   choice_->setFocusPolicy(Qt::TabFocus);
   choice_->setSizeAdjustPolicy(QComboBox::AdjustToContents);
   AddToRow(choice_);
+  auto* relief = new QToolButton;
+  relief->setText(tr("3D"));
+  relief->setToolTip(tr("Shows the whole ground from the side"));
+  connect(relief, &QToolButton::clicked, this, &SectionView::OpenRelief);
+  AddToRow(relief);
   connect(choice_, &QComboBox::activated, this, [this](int index) {
     SetExaggeration(index == 0 ? std::nullopt : std::optional<double>(choice_->itemData(index).toDouble()));
   });
@@ -70,6 +77,13 @@ SectionView::SectionView(Host& host, QWidget* parent)
 }
 
 SectionView::~SectionView() = default;
+
+ReliefWindow* SectionView::OpenRelief() {
+  auto* opened = new ReliefWindow(window(), Outside(), tr("3D View"));
+  opened->Show(ReliefOf([content = content_] { return content; }), PaintGround, displayUnits_);
+  opened->show();
+  return opened;
+}
 
 QWidget* SectionView::FocusTarget() const { return chart_; }
 

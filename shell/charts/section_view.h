@@ -22,6 +22,7 @@ class QMouseEvent;
 namespace tervane {
 
 class BandPlottable;
+class ReliefWindow;
 
 /// A cut through the ground: named layers as bands over the distance along a line of a map, with the ground on top.
 ///
@@ -49,6 +50,8 @@ class SectionView : public PlotFrame {
   void SetExaggeration(std::optional<double> times);
   void Fit();
   void Zoom(double factor);
+  /// Shows the whole ground from the side, in a window of its own.
+  ReliefWindow* OpenRelief();
 
  protected:
   bool eventFilter(QObject* watched, QEvent* event) override;

@@ -23,6 +23,7 @@
 #include "shell/charts/series_chooser.h"
 #include "shell/charts/series_points.h"
 #include "shell/charts/time_bars.h"
+#include "shell/widgets/layer_colors.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 

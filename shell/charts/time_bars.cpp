@@ -9,6 +9,7 @@
 
 #include "shell/charts/chart_axis.h"
 #include "shell/charts/chart_style.h"
+#include "shell/widgets/layer_colors.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 

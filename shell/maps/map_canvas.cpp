@@ -376,6 +376,32 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio, bool isScreen) {
   }
   painter.save();
   painter.setClipRect(window_.rect);
+  RenderLayers(painter, pixelRatio, isScreen);
+  DrawNorthArrow(painter);
+  DrawScaleBar(painter, MakeScaleBar());
+  if (IsPreparing()) DrawPreparing(painter);
+  painter.restore();
+  DrawFrame(painter);
+  DrawLegends(painter, isScreen);
+}
+
+QImage MapCanvas::AreaPicture(const Envelope& area, QSize pixels) {
+  WaitUntilReady();
+  QImage picture(pixels, QImage::Format_ARGB32_Premultiplied);
+  picture.fill(Qt::transparent);
+  const MapWindow seen = window_;
+  window_.rect = QRectF(QPointF(), QSizeF(pixels));
+  window_.centre = {(area.xMin + area.xMax) / 2, (area.yMin + area.yMax) / 2};
+  window_.metresPerPixel =
+      std::max((area.xMax - area.xMin) / pixels.width(), (area.yMax - area.yMin) / pixels.height());
+  QPainter painter(&picture);
+  painter.setRenderHint(QPainter::Antialiasing);
+  RenderLayers(painter, 1, false);
+  window_ = seen;
+  return picture;
+}
+
+void MapCanvas::RenderLayers(QPainter& painter, double pixelRatio, bool isScreen) {
   if (!below_.empty())
     DrawScene(*ground_, painter, pixelRatio, isScreen, [this, pixelRatio](QPainter& inner, const DrawnMap& map) {
       DrawBackdrop(below_, inner, map, pixelRatio);
@@ -385,10 +411,6 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio, bool isScreen) {
   DrawVectors(painter, pixelRatio, isScreen);
   DrawFlow(painter);
   DrawMarkers(painter);
-  if (IsPreparing()) DrawPreparing(painter);
-  painter.restore();
-  DrawFrame(painter);
-  DrawLegends(painter, isScreen);
 }
 
 void MapCanvas::DrawBackdrop(const std::vector<std::unique_ptr<Backdrop>>& backdrop, QPainter& painter,
@@ -462,10 +484,9 @@ void MapCanvas::DrawMarkers(QPainter& painter) {
   const DrawnMap map = Drawn();
   for (const ShapePicture& shapes : shapes_)
     if (shapes.ArePoints()) shapes.Draw(painter, map);
-  const ScaleBar scale = MakeScaleBar();
   LabelPlaces places(window_.rect);
   places.Take(NorthArrowPlace());
-  places.Take(scale.box);
+  places.Take(MakeScaleBar().box);
   for (const PointLayer& points : content_.points) DrawLabelledPoints(painter, points, map, places);
   for (const LinePicture& lines : lines_) lines.DrawLabels(painter, map, places);
   for (const ShapePicture& shapes : shapes_) shapes.DrawLabels(painter, map, places);
@@ -473,8 +494,6 @@ void MapCanvas::DrawMarkers(QPainter& painter) {
     for (const auto& layer : *backdrop)
       if (const auto picture = layer->layer->Get(); picture && layer->transparency < 1)
         picture->DrawTexts(painter, map, places);
-  DrawNorthArrow(painter);
-  DrawScaleBar(painter, scale);
 }
 
 void MapCanvas::DrawPreparing(QPainter& painter) {

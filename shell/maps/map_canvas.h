@@ -55,6 +55,10 @@ class MapCanvas : public QWidget {
   void WaitUntilReady();
   /// The map as it is seen, with more pixels for paper.
   QImage Picture(double pixelRatio);
+  /// An area of the map alone, without what stands around it, transparent where nothing lies. It fills the picture.
+  QImage AreaPicture(const Envelope& area, QSize pixels);
+  /// What is shown when everything is.
+  std::optional<Envelope> WholeArea() const;
 
   QSize sizeHint() const override { return {640, 480}; }
 
@@ -79,10 +83,11 @@ class MapCanvas : public QWidget {
   enum class Gesture { None, Press, Pan, Box };
 
   void Prepare(Layer& layer);
-  std::optional<Envelope> WholeArea() const;
   void Arrange();
   void Redraw();
   void Render(QPainter& painter, double pixelRatio, bool isScreen);
+  /// All layers, within the window.
+  void RenderLayers(QPainter& painter, double pixelRatio, bool isScreen);
   /// How layers are drawn now.
   DrawnMap Drawn() const;
   struct Scene;     ///< A part of the map as last drawn.

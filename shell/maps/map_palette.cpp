@@ -112,13 +112,6 @@ QRgb CodeColor(std::size_t ordinal) {
   return QColor::fromHsv(static_cast<int>((turn - std::floor(turn)) * 359), saturation, value).rgb();
 }
 
-double NiceStep(double atLeast) {
-  const double power = std::pow(10.0, std::floor(std::log10(atLeast)));
-  for (const double factor : {1.0, 2.0, 2.5, 5.0})
-    if (factor * power >= atLeast * (1 - 1e-9)) return factor * power;
-  return 10 * power;
-}
-
 std::vector<double> ClassBorders(double smallest, double largest) {
   constexpr double kMostClasses = 10;
   // What a conversion of single precision numbers may be off a border, in steps.

@@ -16,8 +16,6 @@
 
 namespace tervane {
 
-/// The smallest of 1, 2, 2.5 or 5 times a power of ten that is not below.
-double NiceStep(double atLeast);
 /// Borders of 5 to 10 classes of one width around these values, ascending, at numbers that people like; of two equal
 /// values that one alone.
 std::vector<double> ClassBorders(double smallest, double largest);

@@ -5,13 +5,17 @@
 #include <QCheckBox>
 #include <QHBoxLayout>
 #include <QMenu>
+#include <QPointer>
 #include <QSlider>
 #include <QToolButton>
 #include <QWidgetAction>
+#include <algorithm>
 #include <utility>
 
 #include "platform/item_types.h"
 #include "shell/maps/map_canvas.h"
+#include "shell/maps/map_export.h"
+#include "shell/relief/relief_window.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -36,6 +40,8 @@ MapView::MapView(Host& host, QWidget* parent) : PlotFrame(host, parent), canvas_
   layersButton_->hide();
   connect(layersButton_->menu(), &QMenu::aboutToShow, this, &MapView::FillLayerMenu);
   AddToRow(layersButton_);
+  AddCommand(tr("&Save Map As..."), [this] { SaveMapAs(); });
+  AddCommand(tr("&3D View"), [this] { OpenRelief(); });
   hillshade_ = AddCommand(tr("&Hillshade"), [this] {
     SetHillshade(hillshade_->isChecked());
     Outside().SetSetting(kHillshade, hillshade_->isChecked() ? "1" : "0");
@@ -114,6 +120,76 @@ void MapView::FillLayerMenu() {
     action->setDefaultWidget(row);
     menu->addAction(action);
   }
+}
+
+// ---- The map as a file
+
+void MapView::SaveMapAs() {
+  if (content_.IsEmpty()) {
+    Outside().ShowMessage("There is nothing here to save.", Host::Icon::Information);
+    return;
+  }
+  const bool hasValues = !content_.grids.empty();
+  const std::string picture = "Picture with world file (*.png)|*.png|", values = "Values as GeoTIFF (*.tif)|*.tif|";
+  const auto path = Outside().AskFileToSave(
+      {FromQt(tr("Save Map As")), picture + (hasValues ? values : std::string()) + "|", "png", {}});
+  if (!path) return;
+  TakeFrame();
+  FileResult written;
+  if (hasValues && QString::fromStdString(*path).endsWith(".tif", Qt::CaseInsensitive)) {
+    written = WriteValues(*path, *content_.grids.front().grid);
+  } else {
+    constexpr double kPaperRatio = 2;
+    const MapWindow& seen = canvas_->Window();
+    const MapPoint upperLeft = seen.ToMap(seen.rect.topLeft()), lowerRight = seen.ToMap(seen.rect.bottomRight());
+    const Envelope area{upperLeft.x, lowerRight.y, lowerRight.x, upperLeft.y};
+    written = WritePlacedPicture(*path, canvas_->AreaPicture(area, (seen.rect.size() * kPaperRatio).toSize()), area);
+  }
+  if (!written.Ok()) Outside().ShowMessage(written.error, Host::Icon::Error);
+}
+
+// ---- The map from the side
+
+namespace {
+
+/// As many pixels as show the cells of a relief well.
+QSize DrapePixels(const Envelope& area) {
+  constexpr double kLongest = 2000;
+  const double width = area.xMax - area.xMin, height = area.yMax - area.yMin, longest = std::max(width, height);
+  return {std::max(1, static_cast<int>(kLongest * width / longest)),
+          std::max(1, static_cast<int>(kLongest * height / longest))};
+}
+
+}  // namespace
+
+ReliefWindow* MapView::OpenRelief() {
+  const std::optional<Envelope> area = canvas_->WholeArea();
+  if (!area || !(area->xMax > area->xMin) || !(area->yMax > area->yMin)) {
+    Outside().ShowMessage("There is nothing here to show in 3D.", Host::Icon::Information);
+    return nullptr;
+  }
+  TakeFrame();
+  const auto ground = [view = QPointer<MapView>(this)]() -> SectionContent {
+    return view && view->ground_ ? view->ground_() : SectionContent();
+  };
+  const auto values = content_.grids.empty() ? nullptr : content_.grids.front().grid;
+  auto drape = std::make_shared<ReliefDrape>();
+  const QImage picture = canvas_->AreaPicture(*area, DrapePixels(*area)).convertToFormat(QImage::Format_ARGB32);
+  drape->width = picture.width();
+  drape->height = picture.height();
+  for (int row = 0; row < picture.height(); ++row) {
+    const auto* line = reinterpret_cast<const QRgb*>(picture.constScanLine(row));
+    drape->pixels.insert(drape->pixels.end(), line, line + picture.width());
+  }
+  const auto paint = [drape = std::shared_ptr<const ReliefDrape>(drape), area = *area](Relief& relief) {
+    PaintGround(relief);
+    relief.bodies.front().drape = DrapeOver(relief.raster, *drape, area);
+    relief.bodies.front().isShown = true;
+  };
+  auto* opened = new ReliefWindow(window(), Outside(), tr("3D View"));
+  opened->Show(ReliefOf(ground, values), paint, units_);
+  opened->show();
+  return opened;
 }
 
 void MapView::LightSlopes(MapContent& content, bool isOn) {

@@ -10,6 +10,7 @@
 namespace tervane {
 
 class MapCanvas;
+class ReliefWindow;
 
 /// A map of a page with its status line and buttons.
 ///
@@ -38,6 +39,15 @@ class MapView : public PlotFrame {
   /// The layers of the backdrop, the topmost first.
   std::vector<std::string> LayerTitles() const;
 
+  /// Tells the ground on which the map lies in its 3D view. It is not asked once the map is gone. Without it, or where
+  /// no ground is known, the values of the map's first grid serve as heights.
+  void SetGround(std::function<SectionContent()> ground) { ground_ = std::move(ground); }
+  /// Asks for a file and writes the part of the map that is seen as a picture that knows its place, or the values of
+  /// the first grid, as the file's name tells.
+  void SaveMapAs();
+  /// Shows the map from the side, in a window of its own; null where there is nothing to show, which is told.
+  ReliefWindow* OpenRelief();
+
  private:
   /// Lights the slopes of elevations, or no longer.
   void SetHillshade(bool isOn);
@@ -50,6 +60,7 @@ class MapView : public PlotFrame {
 
   MapContent content_;
   std::map<std::string, LayerLook> looks_;  ///< By the layer's title; those that were changed.
+  std::function<SectionContent()> ground_;
   QToolButton* layersButton_;
   MapCanvas* canvas_;
   QAction* hillshade_;

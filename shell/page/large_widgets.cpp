@@ -3,6 +3,7 @@
 #include <QHBoxLayout>
 
 #include "forms/plots.h"
+#include "pages/parts/ground_section.h"
 #include "shell/charts/depth_columns.h"
 #include "shell/charts/section_view.h"
 #include "shell/charts/series_plot.h"
@@ -12,6 +13,7 @@
 #include "shell/page/table_view.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
+#include "subsurface/saturated_zone.h"
 
 namespace tervane {
 
@@ -40,9 +42,10 @@ class TableWidget : public ControlWidget {
 
 class MapWidget : public ControlWidget {
  public:
-  MapWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
+  MapWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control), soils_(page.Node()) {
     MakeLabel();
     view_ = new MapView(page.Outside());
+    view_->SetGround([this, &page] { return GroundOf(page); });
     MakeField(view_, true);
   }
   bool GrowsDown() const override { return true; }
@@ -58,6 +61,15 @@ class MapWidget : public ControlWidget {
   }
 
  private:
+  /// What the page's section would cut, else the ground of the setup.
+  SectionContent GroundOf(CYbSEDlgBase& page) {
+    for (const auto& control : page.Form().Controls())
+      if (control->kind == ControlKind::Section) return control->section();
+    const auto* zone = page.Node().Important(kSaturatedZone);
+    return zone ? SectionOf(*zone, soils_) : SectionContent();
+  }
+
+  GroundSoils soils_;
   MapView* view_;
 };
 

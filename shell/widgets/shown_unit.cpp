@@ -2,6 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/widgets/shown_unit.h"
 
+#include <cmath>
+
 #include "platform/text.h"
 #include "shell/widgets/qt_text.h"
 
@@ -27,6 +29,13 @@ ShownUnit::ShownUnit(int itemType, int storedUnit, const DisplayUnits* units) {
 QString ShownUnit::Value(double stored) const {
   const QString number = ToQt(FormatNumber(Shown(stored), "%.6g"));
   return text_.empty() ? number : number + " " + ToQt(text_);
+}
+
+double NiceStep(double atLeast) {
+  const double power = std::pow(10.0, std::floor(std::log10(atLeast)));
+  for (const double factor : {1.0, 2.0, 2.5, 5.0})
+    if (factor * power >= atLeast * (1 - 1e-9)) return factor * power;
+  return 10 * power;
 }
 
 }  // namespace tervane

@@ -27,4 +27,7 @@ class ShownUnit {
   UnitConversion toShown_, toStored_;
 };
 
+/// The smallest of 1, 2, 2.5 or 5 times a power of ten that is not below.
+double NiceStep(double atLeast);
+
 }  // namespace tervane

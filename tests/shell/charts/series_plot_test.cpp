@@ -21,6 +21,7 @@
 
 #include "shell/charts/chart_style.h"
 #include "shell/charts/series_chooser.h"
+#include "shell/widgets/layer_colors.h"
 #include "tests/shell/plot_events.h"
 
 namespace tervane::series_plot_test {
