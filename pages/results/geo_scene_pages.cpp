@@ -2,7 +2,14 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/results/geo_scene_pages.h"
 
+#include <algorithm>
+#include <iterator>
+
+#include "data/datafile_facts.h"
 #include "document/flow_model_document.h"
+#include "pages/parts/plot_content.h"
+#include "pages/parts/section_tool.h"
+#include "platform/files.h"
 #include "platform/os_process.h"
 #include "platform/paths.h"
 #include "results/geo_scene.h"
@@ -34,7 +41,27 @@ void Launch(const CGeoScene3DKvf& node, const CYbSEDlgBase& page) {
   if (!viewer.AnnounceWhenReady("WM_GS3Orvik_Update")) refuse("GeoScene3D is not ready to receive windows messages");
 }
 
-void DescribeScene(PageForm& form, CGeoScene3DKvf& n, CYbSEDlgBase& page) {
+/// The page of a scene: what the viewer gets, and the same surfaces here.
+class CGeoScene3DDlg : public PageOf<CGeoScene3DKvf> {
+ public:
+  CGeoScene3DDlg(CYbSEKvfBase& node, const PageContext& context)
+      : PageOf(node, context), section_(Context().syncSoon) {}
+
+ protected:
+  void Describe(PageForm& form) override;
+
+ private:
+  /// The path of a file of the results, as "_CompLayers.nds2"; empty for a setup that was never saved.
+  std::string ResultOf(const char* ending) const;
+  std::string SurfaceFile() const;
+  MapContent Terrain() const;
+  SectionContent Surfaces() const;
+
+  SectionTool section_;
+};
+
+void CGeoScene3DDlg::Describe(PageForm& form) {
+  CGeoScene3DKvf& n = Node();
   form.Number("Vertical exaggeration factor:", n.VerticalExaggerationFactor);
   form.Radio("", n.LayerType);
   form.Check("Show Lenses", n.ShowLenses).EnabledWhen(Is(n.LayerType, CGeoScene3DKvf::kGeological));
@@ -43,13 +70,69 @@ void DescribeScene(PageForm& form, CGeoScene3DKvf& n, CYbSEDlgBase& page) {
     form.Integer("Show every", n.ShowEveryTimeStep).Unit("time step").EnabledWhen(!On(n.UseAllTimeSteps));
   }
   form.Number("Transparency of surfaces:", n.Transparency);
-  form.Button("Launch GeoScene3D...", [&n, &page] { Launch(n, page); });
+  form.Button("Launch GeoScene3D...", [&n, this] { Launch(n, *this); });
+  const Condition areThere = Sentence("the surfaces are there", [this] { return FileExists(SurfaceFile()); });
+  section_.DescribeButtons(form, areThere);
+  form.Map([this] { return Terrain(); }).ShownWhen(areThere);
+  section_.DescribeSection(
+      form, [this] { return Surfaces(); }, areThere);
+}
+
+std::string CGeoScene3DDlg::ResultOf(const char* ending) const {
+  const auto* document = dynamic_cast<const CFlowModelDoc*>(&Context().document);
+  if (!document || document->PathName().empty()) return {};
+  return ResultFileName(document->getResultFolder(), BaseNameOf(document->PathName()), "") + ending;
+}
+
+std::string CGeoScene3DDlg::SurfaceFile() const {
+  return ResultOf(Node().LayerType == CGeoScene3DKvf::kGeological ? "_GeoLayers.nds2" : "_CompLayers.nds2");
+}
+
+MapContent CGeoScene3DDlg::Terrain() const {
+  MapContent map = GridFileMap(Node(), SurfaceFile(), 1);
+  section_.PutOn(map);
+  return map;
+}
+
+SectionContent CGeoScene3DDlg::Surfaces() const {
+  SectionContent section;
+  const auto take = [&](const std::string& file, int item, GridSlice slice = {}) {
+    MapContent map = GridFileMap(Node(), file, item, slice);
+    std::ranges::move(map.awaited, std::back_inserter(section.awaited));
+    if (map.grids.empty()) section.message = map.message;
+    return Level{map.grids.empty() ? nullptr : map.grids.front().grid};
+  };
+  int number = 0;
+  const std::string layers = SurfaceFile();
+  for (const DataItem& item : DataFileFactsOf(layers)->items) {
+    const Level level = take(layers, ++number);
+    if (!level.grid) continue;
+    if (number == 1)
+      section.ground = level;
+    else
+      section.surfaces.push_back({item.name, level});
+  }
+  const auto add = [&](const std::string& name, const Level& level) {
+    if (level.grid) section.curves.push_back({name, level});
+  };
+  if (const std::string lenses = ResultOf("_GeoLenses.nds2");
+      Node().LayerType == CGeoScene3DKvf::kGeological && Node().ShowLenses && FileExists(lenses)) {
+    int lens = 0;
+    for (const DataItem& item : DataFileFactsOf(lenses)->items) add(item.name, take(lenses, ++lens));
+  }
+  if (const std::string heads = ResultOf("_3DSZ.nds3"); Node().IsOfResults() && FileExists(heads)) {
+    const auto& items = DataFileFactsOf(ResultOf("_CompLayers.nds2"))->items;
+    // As the scene has them: a layer's head bears the name of its surface.
+    for (std::size_t i = items.size(); i-- > 1;)
+      add("Head elevation: " + items[i].name, take(heads, 1, {0, static_cast<int>(i) - 1}));
+  }
+  return section;
 }
 
 }  // namespace
 
 std::span<const PageRow> GeoScenePages() {
-  static constexpr PageRow kRows[] = {DescribedBy<DescribeScene>(kGeoScenePage)};
+  static constexpr PageRow kRows[] = {PageIs<CGeoScene3DDlg, CGeoScene3DKvf>(kGeoScenePage)};
   return kRows;
 }
 
