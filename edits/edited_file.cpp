@@ -26,16 +26,21 @@ std::string HashOfFile(const std::string& path, const FileStamp& stamp) {
 
 void KnownFile::Remember(const std::string& path) {
   stamp_ = StampOf(path);
+  other_.reset();
   hash_ = HashOfFile(path, stamp_);
 }
 
 bool KnownFile::IsOther(const std::string& path) {
   const FileStamp now = StampOf(path);
   if (now == stamp_) return false;
+  if (now == other_) return true;
   // Copied back or touched: the same content under another time.
-  if (hash_.empty() || now.size != stamp_.size || HashOfFile(path, now) != hash_) return true;
-  stamp_ = now;
-  return false;
+  const bool isOther = hash_.empty() || now.size != stamp_.size || HashOfFile(path, now) != hash_;
+  if (isOther)
+    other_ = now;
+  else
+    stamp_ = now;
+  return isOther;
 }
 
 std::string EditedFile::Reload() {

@@ -7,6 +7,7 @@
 
 #include <cstddef>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -25,6 +26,7 @@ class KnownFile {
 
  private:
   FileStamp stamp_;
+  std::optional<FileStamp> other_;  ///< Of another content, which is not looked at again.
   std::string hash_;
 };
 

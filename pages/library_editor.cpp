@@ -17,7 +17,6 @@ namespace tervane {
 
 namespace {
 
-constexpr std::size_t kMostSteps = 200;
 constexpr std::chrono::milliseconds kQuick(1000);
 
 std::string Capital(std::string_view word) {
@@ -39,6 +38,23 @@ class LibraryEditor::Node : public CTvnKvfBase {
     for (const Finding& finding : found) AddFinding(finding);
     return found.empty() ? 1 : 0;
   }
+};
+
+/// A state to go back to; what it shares with others costs nothing.
+class LibraryEditor::StateStep : public EditStep {
+ public:
+  StateStep(LibraryEditor& editor, State state) : editor_(editor), state_(std::move(state)) {}
+
+  void Swap() override {
+    State now = editor_.shadow_;
+    editor_.GoTo(state_);
+    state_ = std::move(now);
+  }
+  std::size_t Bytes() const override { return sizeof(*this) + state_.entries.size() * sizeof(state_.entries[0]); }
+
+ private:
+  LibraryEditor& editor_;
+  State state_;
 };
 
 /// The rows of the current entry.
@@ -204,37 +220,27 @@ class LibraryEditor::Page : public CYbSEDlgBase {
 };
 
 LibraryEditor::LibraryEditor(const LibraryKind& kind, std::string path)
-    : path_(std::move(path)),
+    : EditedFile(std::move(path)),
       library_(kind),
       document_(std::make_unique<CYbSEKvfGlobalBase>(std::string(kind.target))),
       node_(std::make_unique<Node>(kind)) {
-  problem_ = Reload();
+  Begin();
 }
 
 LibraryEditor::~LibraryEditor() = default;
 
-std::string LibraryEditor::Reload() {
-  const FileStamp stamp = StampOf(path_);
+std::string LibraryEditor::Read() {
   Library read(*library_.kind);
-  if (std::string problem = ReadLibrary(path_, read); !problem.empty()) return problem;
+  if (std::string problem = ReadLibrary(Path(), read); !problem.empty()) return problem;
   // What was chosen stays chosen, by its name.
   const auto chosen = current_ < library_.entries.size() ? read.Find(library_.entries[current_].Name()) : std::nullopt;
   library_ = std::move(read);
   current_ = chosen.value_or(0);
-  stamp_ = stamp;
-  Begin();
-  return {};
-}
-
-bool LibraryEditor::IsOtherOnDisk() const { return StampOf(path_) != stamp_; }
-
-void LibraryEditor::Begin() {
-  undone_.clear();
-  redone_.clear();
   source_ = nullptr;
   shadow_ = {};
   shadow_ = saved_ = Now();
   Check();
+  return {};
 }
 
 // ---- Entries
@@ -344,10 +350,8 @@ void LibraryEditor::CommitValue(const std::string& action, const void* source) {
   State now = Now();
   const auto time = std::chrono::steady_clock::now();
   if (!now.HoldsSame(shadow_)) {
-    redone_.clear();
     const bool isSame = source && source == source_ && time - latest_ < kQuick && CanUndo() && UndoName() == action;
-    if (!isSame) undone_.push_back({action, shadow_});
-    if (undone_.size() > kMostSteps) undone_.erase(undone_.begin());
+    if (!isSame) Take(action, std::make_unique<StateStep>(*this, shadow_));
   }
   shadow_ = std::move(now);
   source_ = source;
@@ -365,24 +369,15 @@ void LibraryEditor::GoTo(const State& state) {
   Check();
 }
 
-void LibraryEditor::Step(std::vector<Change>& from, std::vector<Change>& to) {
-  if (from.empty()) return;
-  Change change = std::move(from.back());
-  from.pop_back();
-  to.push_back({change.action, shadow_});
-  GoTo(change.state);
-}
-
 bool LibraryEditor::IsModified() const { return !shadow_.HoldsSame(saved_); }
 
-FileResult LibraryEditor::Save(const std::string& path) {
-  FileResult result = WriteLibrary(path, library_);
-  if (!result.Ok()) return result;
-  path_ = path;
-  stamp_ = StampOf(path);
+FileResult LibraryEditor::Write(const std::string& path, ProgressPart /*progress*/) {
+  return WriteLibrary(path, library_);
+}
+
+void LibraryEditor::Saved() {
   saved_ = shadow_;
   source_ = nullptr;
-  return result;
 }
 
 }  // namespace tervane

@@ -11,27 +11,19 @@
 #include <vector>
 
 #include "core/document.h"
+#include "edits/edited_file.h"
 #include "forms/page.h"
 #include "forms/plots.h"
 #include "libraries/library.h"
 
 namespace tervane {
 
-class LibraryEditor {
+class LibraryEditor : public EditedFile {
  public:
   LibraryEditor(const LibraryKind& kind, std::string path);
-  ~LibraryEditor();
-  LibraryEditor(const LibraryEditor&) = delete;
-  LibraryEditor& operator=(const LibraryEditor&) = delete;
+  ~LibraryEditor() override;
 
   const LibraryKind& Kind() const { return *library_.kind; }
-  const std::string& Path() const { return path_; }
-  /// Why the file cannot be edited; empty when it can.
-  const std::string& Problem() const { return problem_; }
-  /// Reads the file again and forgets all changes; what cannot be read takes nothing away.
-  std::string Reload();
-  /// Whether another program has changed the file since it was read or saved.
-  bool IsOtherOnDisk() const;
 
   // ---- Entries, counted from 0
 
@@ -52,14 +44,13 @@ class LibraryEditor {
 
   /// Takes what is different now as one step. Changes of one source in quick succession are one.
   void CommitValue(const std::string& action, const void* source = nullptr);
-  bool CanUndo() const { return !undone_.empty(); }
-  bool CanRedo() const { return !redone_.empty(); }
-  std::string UndoName() const { return CanUndo() ? undone_.back().action : std::string(); }
-  std::string RedoName() const { return CanRedo() ? redone_.back().action : std::string(); }
-  void Undo() { Step(undone_, redone_); }
-  void Redo() { Step(redone_, undone_); }
-  bool IsModified() const;
-  FileResult Save(const std::string& path);
+  /// What was typed and typed back is no change.
+  bool IsModified() const override;
+
+ protected:
+  std::string Read() override;
+  FileResult Write(const std::string& path, ProgressPart progress) override;
+  void Saved() override;
 
  private:
   class Node;
@@ -74,26 +65,17 @@ class LibraryEditor {
 
     bool HoldsSame(const State& other) const;
   };
-  struct Change {
-    std::string action;
-    State state;  ///< To go back to.
-  };
+  class StateStep;
 
   State Now() const;
   void GoTo(const State& state);
-  void Step(std::vector<Change>& from, std::vector<Change>& to);
-  /// Forgets all changes: what is held now is what the file has.
-  void Begin();
   void Insert(LibraryEntry entry, const std::string& action);
   void Check();
   std::string ActionName(const char* verb) const;
 
-  std::string path_, problem_;
-  FileStamp stamp_;
   Library library_;
   std::size_t current_ = 0;
   State shadow_, saved_;
-  std::vector<Change> undone_, redone_;
   const void* source_ = nullptr;
   std::chrono::steady_clock::time_point latest_;
   std::vector<LibraryFinding> findings_;

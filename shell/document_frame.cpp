@@ -428,6 +428,12 @@ void DocumentFrame::RefreshPlots() {
   Change(session_->Document().Root(), kRefreshPlots, tr("Refresh"));
 }
 
+void DocumentFrame::FollowFiles() {
+  Commit();
+  session_->Document().Root().SetRevalidateAll();
+  RefreshPlots();
+}
+
 void DocumentFrame::Commit() {
   if (page_) page_->Commit();
 }

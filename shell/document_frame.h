@@ -80,6 +80,8 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   void Commit();
   /// Looks at the files of the shown page again, and draws all anew.
   void RefreshPlots();
+  /// Looks anew at the files that the setup uses: another tab has changed one.
+  void FollowFiles();
   /// Reads the preprocessor's report again and shows its pages anew; the page that is shown stays where the report
   /// still has it. The end of a run and a timer call it when the report has changed on disk.
   void RebuildProcessedData();

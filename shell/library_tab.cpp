@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/library_tab.h"
 
-#include <QFileInfo>
 #include <QHBoxLayout>
 #include <QListWidget>
 #include <QPixmap>
@@ -27,7 +26,7 @@ constexpr int kListWidth = 230;
 }  // namespace
 
 LibraryTab::LibraryTab(const LibraryKind& kind, const std::string& path, Host& host)
-    : editor_(kind, path), host_(host) {
+    : EditTab(host), editor_(kind, path) {
   pagePlace_ = new QWidget;
   auto* place = new QVBoxLayout(pagePlace_);
   place->setContentsMargins(0, 0, 0, 0);
@@ -37,9 +36,7 @@ LibraryTab::LibraryTab(const LibraryKind& kind, const std::string& path, Host& h
   body->addWidget(pagePlace_);
   body->setStretchFactor(1, 1);
   body->setSizes({Theme::Get().Scaled(kListWidth), Theme::Get().Scaled(4 * kListWidth)});
-  auto* all = new QVBoxLayout(this);
-  all->setContentsMargins(0, 0, 0, 0);
-  all->addWidget(body);
+  SetBody(body);
   BuildPage();
   Sync();
 }
@@ -49,9 +46,10 @@ LibraryTab::~LibraryTab() {
   delete page_;
 }
 
-QString LibraryTab::Name() const { return QFileInfo(ToQt(Path())).fileName(); }
-
-QString LibraryTab::Title() const { return editor_.IsModified() ? Name() + "*" : Name(); }
+Host::FileQuestion LibraryTab::NameQuestion() const {
+  const LibraryKind& kind = editor_.Kind();
+  return {"Save As", std::string(kind.filter), std::string(kind.extension), Path()};
+}
 
 QWidget* LibraryTab::BuildList() {
   const Theme& theme = Theme::Get();
@@ -102,7 +100,7 @@ void LibraryTab::BuildPage() {
   delete page_;
   const auto sync = [this] { QTimer::singleShot(0, this, &LibraryTab::Sync); };
   page_ = new PageView(editor_.MakePage(
-                           host_, [this] { Sync(); }, sync),
+                           Outside(), [this] { Sync(); }, sync),
                        Name());
   pagePlace_->layout()->addWidget(page_);
   const Theme& theme = Theme::Get();
@@ -152,39 +150,6 @@ void LibraryTab::Act(void (LibraryEditor::*operation)()) {
 
 void LibraryTab::Commit() {
   if (page_) page_->Commit();
-}
-
-void LibraryTab::Undo() {
-  editor_.Undo();
-  Sync();
-}
-
-void LibraryTab::Redo() {
-  editor_.Redo();
-  Sync();
-}
-
-bool LibraryTab::Save(const std::string& path) {
-  Commit();
-  const bool isRenamed = path != Path();
-  const FileResult result = editor_.Save(path);
-  if (!result.Ok()) host_.ShowMessage(result.error, Host::Icon::Error);
-  if (!result.note.empty()) host_.ShowMessage(result.note, Host::Icon::Information);
-  // The page bears the file's name.
-  if (result.Ok() && isRenamed) BuildPage();
-  Sync();
-  return result.Ok();
-}
-
-void LibraryTab::CheckDisk() {
-  // Unsaved changes stay; the user is asked when they are saved.
-  if (!editor_.IsOtherOnDisk() || editor_.IsModified()) return;
-  if (editor_.Reload().empty()) Sync();
-}
-
-void LibraryTab::Reload() {
-  if (const std::string problem = editor_.Reload(); !problem.empty()) host_.ShowMessage(problem, Host::Icon::Error);
-  Sync();
 }
 
 void LibraryTab::Redraw() {

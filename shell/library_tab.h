@@ -2,10 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <QWidget>
 #include <string>
 
 #include "pages/library_editor.h"
+#include "shell/editors/edit_tab.h"
 
 class QListWidget;
 class QToolButton;
@@ -15,7 +15,7 @@ namespace tervane {
 class PageView;
 
 /// A library in its tab: its entries at the left, the chosen one as a page.
-class LibraryTab : public QWidget {
+class LibraryTab : public EditTab {
   Q_OBJECT
 
  public:
@@ -24,36 +24,23 @@ class LibraryTab : public QWidget {
 
   LibraryEditor& Editor() { return editor_; }
   const LibraryEditor& Editor() const { return editor_; }
-  const std::string& Path() const { return editor_.Path(); }
-  /// The name of the file, and the same with a star when there are changes to save.
-  QString Name() const;
-  QString Title() const;
+  EditedFile& File() override { return editor_; }
 
-  /// Hands over what was typed and not yet entered; to be called before every command.
-  void Commit();
-  void Undo();
-  void Redo();
-  /// False when it failed; the user has been told why.
-  bool Save(const std::string& path);
-  /// Follows another program that has changed the file, unless there are changes to save.
-  void CheckDisk();
-  /// Reads the file again and throws the changes away that were not saved; the user is told when it cannot be read.
-  void Reload();
-  /// Makes all anew that was computed from colours and sizes.
-  void Redraw();
+  void Commit() override;
+  Host::FileQuestion NameQuestion() const override;
+  void Redraw() override;
 
- signals:
-  /// The title or what can be undone is another one.
-  void StateChanged();
+ protected:
+  void Sync() override;
+  /// The page bears the file's name.
+  void Renamed() override { BuildPage(); }
 
  private:
   QWidget* BuildList();
   void BuildPage();
-  void Sync();
   void Act(void (LibraryEditor::*operation)());
 
   LibraryEditor editor_;
-  Host& host_;
   QListWidget* list_;
   QToolButton *add_, *copy_, *delete_;
   QWidget* pagePlace_;

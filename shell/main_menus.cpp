@@ -27,8 +27,8 @@
 #include "shell/compare_view.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
+#include "shell/editors/edit_tab.h"
 #include "shell/ground_window.h"
-#include "shell/library_tab.h"
 #include "shell/main_window.h"
 #include "shell/page/table_view.h"
 #include "shell/program.h"
@@ -61,7 +61,7 @@ void GoToImportant(DocumentFrame& frame, ImportantName<Node> name) {
 std::pair<QString, QString> TitleAndPath(const QWidget* tab) {
   if (const auto* frame = qobject_cast<const DocumentFrame*>(tab))
     return {frame->Title(), ToQt(frame->Session().Path())};
-  if (const auto* library = qobject_cast<const LibraryTab*>(tab)) return {library->Title(), ToQt(library->Path())};
+  if (const auto* editor = qobject_cast<const EditTab*>(tab)) return {editor->Title(), ToQt(editor->Path())};
   if (const auto* viewer = qobject_cast<const DataViewer*>(tab)) return {viewer->Title(), ToQt(viewer->Path())};
   if (const auto* shown = qobject_cast<const TemplateTab*>(tab)) return {shown->Title(), ToQt(shown->Path())};
   if (const auto* comparison = qobject_cast<const CompareView*>(tab)) return {comparison->Title(), comparison->Path()};
@@ -99,18 +99,18 @@ MainWindow::Command& MainWindow::AddForDocument(QMenu* menu, const QString& text
 
 MainWindow::Command& MainWindow::AddForEditor(QMenu* menu, const QString& text, const char* icon,
                                               const QKeySequence& keys, std::function<void(DocumentFrame&)> ofDocument,
-                                              std::function<void(LibraryTab&)> ofLibrary) {
+                                              std::function<void(EditTab&)> ofEditor) {
   Command& command =
-      Add(menu, text, icon, keys, [this, ofDocument = std::move(ofDocument), ofLibrary = std::move(ofLibrary)] {
+      Add(menu, text, icon, keys, [this, ofDocument = std::move(ofDocument), ofEditor = std::move(ofEditor)] {
         if (DocumentFrame* frame = Frame()) {
           frame->Commit();
           ofDocument(*frame);
-        } else if (LibraryTab* library = ShownLibrary()) {
-          library->Commit();
-          ofLibrary(*library);
+        } else if (EditTab* editor = Editor()) {
+          editor->Commit();
+          ofEditor(*editor);
         }
       });
-  command.enabled = [this] { return Frame() || ShownLibrary(); };
+  command.enabled = [this] { return Frame() || Editor(); };
   return command;
 }
 
@@ -130,10 +130,10 @@ void MainWindow::BuildMenus() {
   file->addSeparator();
   Command& save = AddForEditor(
       file, tr("&Save"), "save", QKeySequence::Save, [this](DocumentFrame&) { SaveDocument(); },
-      [this](LibraryTab&) { SaveLibrary(); });
+      [this](EditTab&) { SaveEditor(); });
   AddForEditor(
       file, tr("Save &As…"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_S),
-      [this](DocumentFrame&) { SaveDocumentAs(); }, [this](LibraryTab&) { SaveLibraryAs(); });
+      [this](DocumentFrame&) { SaveDocumentAs(); }, [this](EditTab&) { SaveEditorAs(); });
   AddForDocument(file, tr("&What will be saved…"), nullptr, QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_S),
                  [this](DocumentFrame& frame) { ShowChanges(frame); });
   AddForDocument(file, tr("Com&pare With…"), nullptr, {}, [this](DocumentFrame& frame) { Compare(frame); });
@@ -176,15 +176,15 @@ void MainWindow::BuildEditMenu() {
   QMenu* edit = menuBar()->addMenu(tr("&Edit"));
   Command& undo = AddForEditor(
       edit, tr("&Undo"), "undo", QKeySequence::Undo, [](DocumentFrame& frame) { frame.Undo(); },
-      [](LibraryTab& library) { library.Undo(); });
+      [](EditTab& editor) { editor.Undo(); });
   undo.enabled = [this] {
-    return Frame() ? Frame()->Session().Steps().CanUndo() : ShownLibrary() && ShownLibrary()->Editor().CanUndo();
+    return Frame() ? Frame()->Session().Steps().CanUndo() : Editor() && Editor()->File().CanUndo();
   };
   Command& redo = AddForEditor(
       edit, tr("&Redo"), "redo", QKeySequence::Redo, [](DocumentFrame& frame) { frame.Redo(); },
-      [](LibraryTab& library) { library.Redo(); });
+      [](EditTab& editor) { editor.Redo(); });
   redo.enabled = [this] {
-    return Frame() ? Frame()->Session().Steps().CanRedo() : ShownLibrary() && ShownLibrary()->Editor().CanRedo();
+    return Frame() ? Frame()->Session().Steps().CanRedo() : Editor() && Editor()->File().CanRedo();
   };
   redo.action->setShortcuts({QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_Z), QKeySequence(Qt::CTRL | Qt::Key_Y)});
   undo.action->setObjectName("Undo");
@@ -425,18 +425,18 @@ void MainWindow::SyncCommands() {
     }
   }
   const DocumentFrame* current = Frame();
-  const LibraryTab* library = ShownLibrary();
+  const EditTab* editor = Editor();
   const auto named = [](const QString& text, const std::string& step) {
     return step.empty() ? text : QString("%1 %2").arg(text, Translated(step));
   };
   if (auto* undo = findChild<QAction*>("Undo"))
-    undo->setText(named(tr("&Undo"), current   ? current->Session().Steps().UndoName()
-                                     : library ? library->Editor().UndoName()
-                                               : std::string()));
+    undo->setText(named(tr("&Undo"), current  ? current->Session().Steps().UndoName()
+                                     : editor ? editor->File().UndoName()
+                                              : std::string()));
   if (auto* redo = findChild<QAction*>("Redo"))
-    redo->setText(named(tr("&Redo"), current   ? current->Session().Steps().RedoName()
-                                     : library ? library->Editor().RedoName()
-                                               : std::string()));
+    redo->setText(named(tr("&Redo"), current  ? current->Session().Steps().RedoName()
+                                     : editor ? editor->File().RedoName()
+                                              : std::string()));
   for (int i = 0; i < tabs_->count(); ++i) {
     const auto [title, path] = TitleAndPath(tabs_->widget(i));
     tabs_->setTabText(i, QString(title).replace("&", "&&"));

@@ -32,6 +32,7 @@
 #include "shell/compare_view.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
+#include "shell/editors/edit_tab.h"
 #include "shell/library_tab.h"
 #include "shell/program.h"
 #include "shell/run/document_run.h"
@@ -323,7 +324,7 @@ bool MainWindow::OpenFile(const QString& path) {
   return IsDataFile(path) || KindOf(path) || IsNamedAsTemplate(FromQt(path)) ? ShowDataFile(path) : OpenDocument(path);
 }
 
-LibraryTab* MainWindow::ShownLibrary() const { return qobject_cast<LibraryTab*>(tabs_->currentWidget()); }
+EditTab* MainWindow::Editor() const { return qobject_cast<EditTab*>(tabs_->currentWidget()); }
 
 bool MainWindow::OpenLibrary(const LibraryKind& kind, const QString& path) {
   const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
@@ -337,11 +338,19 @@ bool MainWindow::OpenLibrary(const LibraryKind& kind, const QString& path) {
     host_.ShowMessage(library->Editor().Problem(), Host::Icon::Error);
     return false;
   }
-  connect(library.get(), &LibraryTab::StateChanged, this, &MainWindow::SyncCommands);
-  const QString title = library->Title();
-  tabs_->setCurrentIndex(tabs_->addTab(library.release(), title));
-  SyncCommands();
+  AddEditor(std::move(library));
   return true;
+}
+
+void MainWindow::AddEditor(std::unique_ptr<EditTab> editor) {
+  connect(editor.get(), &EditTab::StateChanged, this, &MainWindow::SyncCommands);
+  connect(editor.get(), &EditTab::FileSaved, this, [this] {
+    for (int i = 0; i < tabs_->count(); ++i)
+      if (auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i))) frame->FollowFiles();
+  });
+  const QString title = editor->Title();
+  tabs_->setCurrentIndex(tabs_->addTab(editor.release(), title));
+  SyncCommands();
 }
 
 bool MainWindow::ShowTemplate(const QString& path) {
@@ -362,40 +371,40 @@ bool MainWindow::ShowTemplate(const QString& path) {
   return true;
 }
 
-bool MainWindow::SaveLibrary() {
-  LibraryTab* library = ShownLibrary();
-  if (!library) return false;
-  library->Commit();
-  if (library->Editor().IsOtherOnDisk()) {
-    const auto answer = host_.Choose(tr("Another program has changed %1 since it was read.").arg(library->Name()),
+bool MainWindow::SaveEditor() {
+  EditTab* editor = Editor();
+  if (!editor) return false;
+  editor->Commit();
+  if (!editor->File().WhyReadOnly().empty()) return SaveEditorAs();
+  if (FileExists(editor->Path()) && editor->File().IsOtherOnDisk()) {
+    const auto answer = host_.Choose(tr("Another program has changed %1 since it was read.").arg(editor->Name()),
                                      tr("To reload is to lose your own changes, to save over it those of the other "
                                         "program; saved under another name, both stay."),
                                      {tr("&Reload"), tr("Save &As…"), tr("Save &Over It")});
-    if (answer == 0) library->Reload();
-    if (answer == 1) return SaveLibraryAs();
+    if (answer == 0) editor->Reload();
+    if (answer == 1) return SaveEditorAs();
     if (answer != 2) return false;
   }
-  return library->Save(library->Path());
+  return editor->Save(editor->Path());
 }
 
-bool MainWindow::SaveLibraryAs() {
-  LibraryTab* library = ShownLibrary();
-  if (!library) return false;
-  const LibraryKind& kind = library->Editor().Kind();
-  const auto path =
-      host_.AskFileToSave({"Save As", std::string(kind.filter), std::string(kind.extension), library->Path()});
-  return path && library->Save(*path);
+bool MainWindow::SaveEditorAs() {
+  EditTab* editor = Editor();
+  if (!editor) return false;
+  editor->Commit();
+  const auto path = host_.AskFileToSave(editor->NameQuestion());
+  return path && editor->Save(*path);
 }
 
-bool MainWindow::CloseLibrary(LibraryTab* library) {
-  tabs_->setCurrentWidget(library);
-  library->Commit();
-  if (library->Editor().IsModified()) {
-    const int answer = AskForChanges(library->Name(), this);
-    if (answer == QMessageBox::Save && !SaveLibrary()) return false;
+bool MainWindow::CloseEditor(EditTab* editor) {
+  tabs_->setCurrentWidget(editor);
+  editor->Commit();
+  if (editor->File().IsModified()) {
+    const int answer = AskForChanges(editor->Name(), this);
+    if (answer == QMessageBox::Save && !SaveEditor()) return false;
     if (answer != QMessageBox::Save && answer != QMessageBox::Discard) return false;
   }
-  delete library;
+  delete editor;
   SyncCommands();
   return true;
 }
@@ -489,7 +498,7 @@ bool MainWindow::CompareRunWith(DocumentFrame& frame, const std::string& passpor
 
 bool MainWindow::CloseTab(QWidget* tab) {
   if (auto* frame = qobject_cast<DocumentFrame*>(tab)) return CloseDocument(frame);
-  if (auto* library = qobject_cast<LibraryTab*>(tab)) return CloseLibrary(library);
+  if (auto* editor = qobject_cast<EditTab*>(tab)) return CloseEditor(editor);
   delete tab;
   SyncCommands();
   return true;
@@ -536,7 +545,7 @@ void MainWindow::changeEvent(QEvent* event) {
   if (Frame()) Frame()->CheckDisk();
   if (Frame()) Frame()->CheckTemplates();
   if (Viewer()) Viewer()->Reload(false);
-  if (ShownLibrary()) ShownLibrary()->CheckDisk();
+  if (Editor()) Editor()->CheckDisk();
   if (auto* shown = qobject_cast<TemplateTab*>(tabs_->currentWidget())) shown->Reload();
 }
 
@@ -573,8 +582,8 @@ void MainWindow::Restyle() {
   for (int i = 0; i < tabs_->count(); ++i)
     if (auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i)))
       frame->Redraw();
-    else if (auto* library = qobject_cast<LibraryTab*>(tabs_->widget(i)))
-      library->Redraw();
+    else if (auto* editor = qobject_cast<EditTab*>(tabs_->widget(i)))
+      editor->Redraw();
     else if (auto* shown = qobject_cast<TemplateTab*>(tabs_->widget(i)))
       shown->Redraw();
   SyncCommands();

@@ -22,7 +22,7 @@ class CExecuteEngineFlagsKvf;
 class DataViewer;
 class DocumentFrame;
 class EditSession;
-class LibraryTab;
+class EditTab;
 struct LibraryKind;
 class Program;
 class ReliefWindow;
@@ -68,13 +68,13 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   void OfferRecoveries();
   bool SaveDocument();
   bool SaveDocumentAs();
-  /// The library that is shown; null where there is none.
-  LibraryTab* ShownLibrary() const;
-  bool SaveLibrary();
-  bool SaveLibraryAs();
+  /// The data file or library that is edited in the tab that is shown; null where there is none.
+  EditTab* Editor() const;
+  bool SaveEditor();
+  bool SaveEditorAs();
   /// False when the user wants to go on with it.
   bool CloseDocument(DocumentFrame* frame);
-  bool CloseLibrary(LibraryTab* library);
+  bool CloseEditor(EditTab* editor);
   /// The same of any tab.
   bool CloseTab(QWidget* tab);
 
@@ -104,9 +104,9 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   /// A command on the current document.
   Command& AddForDocument(QMenu* menu, const QString& text, const char* icon, const QKeySequence& keys,
                           std::function<void(DocumentFrame&)> run);
-  /// A command on the current document or library.
+  /// A command on the current document, or on the data file or library that is edited.
   Command& AddForEditor(QMenu* menu, const QString& text, const char* icon, const QKeySequence& keys,
-                        std::function<void(DocumentFrame&)> ofDocument, std::function<void(LibraryTab&)> ofLibrary);
+                        std::function<void(DocumentFrame&)> ofDocument, std::function<void(EditTab&)> ofEditor);
   void FillRecentMenu();
   void FillWindowMenu();
   void SyncCommands();
@@ -117,6 +117,8 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   /// The tab of that class in which a file is open; null where there is none.
   template <class Tab>
   Tab* TabOf(const std::string& path) const;
+  /// Adds a tab that edits a file and shows it.
+  void AddEditor(std::unique_ptr<EditTab> editor);
   DocumentFrame* AddFrame(std::unique_ptr<EditSession> session);
   void ReloadDocument(DocumentFrame* frame);
   /// Shows what a save would change; true when the user has then saved.

@@ -148,7 +148,7 @@ TEST_F(LibraryInWindow, FollowsTheDiskUnlessThereAreChanges) {
   EXPECT_EQ(Name(2), "Meadow 2");
   {
     const NextAnswer no("Cancel");
-    EXPECT_FALSE(setup_.Window().SaveLibrary());
+    EXPECT_FALSE(setup_.Window().SaveEditor());
     EXPECT_THAT(no.Text(), HasSubstr("Another program has changed crops.etv"));
   }
   EXPECT_THAT(test::ReadFile(path_), Not(HasSubstr("Meadow")));
