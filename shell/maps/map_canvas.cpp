@@ -155,6 +155,43 @@ void MapCanvas::ShowFrame(const GridLayer& grid, std::shared_ptr<const GridPictu
   Redraw();
 }
 
+void MapCanvas::UpdateCells(const CellWindow& cells) {
+  if (layers_.empty() || !layers_.front()->picture || layers_.front()->isOld) return;
+  // It was made here, and nobody else draws it.
+  std::const_pointer_cast<GridPicture>(layers_.front()->picture)->Update(layers_.front()->grid, cells);
+  if (scene_.isNull()) return update();
+  // What lies in the corners of those cells, and as much as a coarser level shows of them.
+  const GridTransform transform(layers_.front()->grid.grid->Geometry());
+  const double around = 1 + 2 * window_.metresPerPixel / layers_.front()->grid.grid->Geometry().cellSize;
+  QPolygonF corners;
+  for (const double i : {cells.i - around, cells.i + cells.nx + around})
+    for (const double j : {cells.j - around, cells.j + cells.ny + around})
+      corners << window_.ToScreen(transform.ToWorld({i, j}));
+  const QRectF part = QRectF(corners.boundingRect().toAlignedRect()) & window_.rect;
+  if (part.isEmpty()) return;
+  QPainter painter(&scene_);
+  painter.setFont(font());
+  painter.setRenderHint(QPainter::Antialiasing);
+  painter.setClipRect(part);
+  painter.fillRect(part, palette().color(QPalette::Base));
+  RenderPart(painter, devicePixelRatioF(), true, part);
+  painter.end();
+  update(part.toAlignedRect());
+}
+
+void MapCanvas::RemakeGrid(const GridLayer& grid) {
+  if (layers_.empty()) return;
+  content_.grids.front() = grid;
+  auto layer = std::make_unique<Layer>();
+  layer->grid = grid;
+  layer->unitKey = units_.UnitKey(grid.grid->ItemType());
+  layer->picture = layers_.front()->picture;
+  layer->isOld = layer->picture != nullptr;
+  layers_.front() = std::move(layer);
+  Prepare(*layers_.front());
+  Arrange();
+}
+
 const GridPicture* MapCanvas::PictureOf(std::size_t grid) const {
   return grid < layers_.size() && !layers_[grid]->isOld ? layers_[grid]->picture.get() : nullptr;
 }
@@ -349,6 +386,15 @@ void MapCanvas::paintEvent(QPaintEvent* /*event*/) {
   QPainter painter(this);
   painter.drawPixmap(0, 0, scene_);
   if (request_ && !content_.IsEmpty()) DrawRequest(painter);
+  if (drag_ && drag_->draw && isPointed_ && !content_.IsEmpty()) {
+    painter.save();
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setClipRect(window_.rect);
+    const bool isDrag = gesture_ == Gesture::Drag;
+    drag_->draw(painter, window_, window_.ToMap(draggedTo_),
+                isDrag ? std::optional(window_.ToMap(pressedAt_)) : std::nullopt);
+    painter.restore();
+  }
   if (gesture_ != Gesture::Box) return;
   QColor veil = palette().color(QPalette::Highlight);
   painter.setPen(QPen(veil, 1.5));
@@ -376,13 +422,17 @@ void MapCanvas::Render(QPainter& painter, double pixelRatio, bool isScreen) {
   }
   painter.save();
   painter.setClipRect(window_.rect);
-  RenderLayers(painter, pixelRatio, isScreen);
-  DrawNorthArrow(painter);
-  DrawScaleBar(painter, MakeScaleBar());
-  if (IsPreparing()) DrawPreparing(painter);
+  RenderPart(painter, pixelRatio, isScreen, window_.rect);
   painter.restore();
   DrawFrame(painter);
   DrawLegends(painter, isScreen);
+}
+
+void MapCanvas::RenderPart(QPainter& painter, double pixelRatio, bool isScreen, const QRectF& part) {
+  RenderLayers(painter, pixelRatio, isScreen, part);
+  DrawNorthArrow(painter);
+  DrawScaleBar(painter, MakeScaleBar());
+  if (IsPreparing()) DrawPreparing(painter);
 }
 
 QImage MapCanvas::AreaPicture(const Envelope& area, QSize pixels) {
@@ -396,18 +446,21 @@ QImage MapCanvas::AreaPicture(const Envelope& area, QSize pixels) {
       std::max((area.xMax - area.xMin) / pixels.width(), (area.yMax - area.yMin) / pixels.height());
   QPainter painter(&picture);
   painter.setRenderHint(QPainter::Antialiasing);
-  RenderLayers(painter, 1, false);
+  RenderLayers(painter, 1, false, window_.rect);
   window_ = seen;
   return picture;
 }
 
-void MapCanvas::RenderLayers(QPainter& painter, double pixelRatio, bool isScreen) {
+void MapCanvas::RenderLayers(QPainter& painter, double pixelRatio, bool isScreen, const QRectF& part) {
+  MapWindow seen = window_;
+  seen.rect = part;
+  seen.centre = window_.ToMap(part.center());
   if (!below_.empty())
     DrawScene(*ground_, painter, pixelRatio, isScreen, [this, pixelRatio](QPainter& inner, const DrawnMap& map) {
       DrawBackdrop(below_, inner, map, pixelRatio);
     });
   for (const auto& layer : layers_)
-    if (layer->picture) layer->picture->Draw(painter, window_, pixelRatio, 1 - layer->grid.transparency);
+    if (layer->picture) layer->picture->Draw(painter, seen, pixelRatio, 1 - layer->grid.transparency);
   DrawVectors(painter, pixelRatio, isScreen);
   DrawFlow(painter);
   DrawMarkers(painter);

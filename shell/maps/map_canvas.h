@@ -17,6 +17,16 @@
 
 namespace tervane {
 
+/// What a user does by dragging on the map in the place of moving it, which the middle button does then.
+struct MapDrag {
+  /// From one place to the next, at first from the place where the button went down to itself.
+  std::function<void(MapPoint from, MapPoint to)> moved;
+  /// At the place where it went up; nothing when the user has given up.
+  std::function<void(std::optional<MapPoint> place)> ended;
+  /// What is seen at the pointer, and of the drag so far where there is one.
+  std::function<void(QPainter& painter, const MapWindow& window, MapPoint at, std::optional<MapPoint> from)> draw;
+};
+
 /// The map itself: its layers in a frame, with legend, north arrow and scale bar; moved by mouse and keyboard.
 class MapCanvas : public QWidget {
   Q_OBJECT
@@ -33,6 +43,12 @@ class MapCanvas : public QWidget {
   /// grid that is `passing` holds but some of the cells, so that nobody can point at one.
   void ShowFrame(const GridLayer& grid, std::shared_ptr<const GridPicture> picture, std::optional<ArrowLayer> arrows,
                  bool isPassing);
+  /// Cells of the first grid have other values, within the colours that it has.
+  void UpdateCells(const CellWindow& cells);
+  /// The first grid has other values or colours; what is seen stays until its picture is ready.
+  void RemakeGrid(const GridLayer& grid);
+  /// The user drags for this, or no longer.
+  void SetDrag(std::optional<MapDrag> drag);
   /// The pictures of the grids; null for one that is in the making.
   const GridPicture* PictureOf(std::size_t grid) const;
   void SetPicked(std::function<void(const MapPick&)> picked) { content_.picked = std::move(picked); }
@@ -80,14 +96,17 @@ class MapCanvas : public QWidget {
 
  private:
   struct Layer;  ///< A grid and its picture, which may still be in the making.
-  enum class Gesture { None, Press, Pan, Box };
+  enum class Gesture { None, Press, Pan, Box, Drag };
 
   void Prepare(Layer& layer);
   void Arrange();
   void Redraw();
   void Render(QPainter& painter, double pixelRatio, bool isScreen);
+  void EndDrag(std::optional<MapPoint> place);
   /// All layers, within the window.
-  void RenderLayers(QPainter& painter, double pixelRatio, bool isScreen);
+  /// What stands on the map, as far as it is seen through `part`.
+  void RenderLayers(QPainter& painter, double pixelRatio, bool isScreen, const QRectF& part);
+  void RenderPart(QPainter& painter, double pixelRatio, bool isScreen, const QRectF& part);
   /// How layers are drawn now.
   DrawnMap Drawn() const;
   struct Scene;     ///< A part of the map as last drawn.
@@ -140,6 +159,7 @@ class MapCanvas : public QWidget {
   std::unique_ptr<Scene> ground_;   ///< What lies below the grids.
   std::unique_ptr<Scene> vectors_;  ///< What lies above them, without points.
   std::optional<MapRequest> request_;
+  std::optional<MapDrag> drag_;
   std::vector<MapPoint> drawn_;  ///< Points of a line that is asked for.
   MapWindow window_;
   QRectF legendPlace_;

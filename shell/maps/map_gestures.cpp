@@ -51,10 +51,17 @@ void MapCanvas::changeEvent(QEvent* event) {
 }
 
 void MapCanvas::mousePressEvent(QMouseEvent* event) {
-  if (event->button() != Qt::LeftButton || content_.IsEmpty()) return QWidget::mousePressEvent(event);
+  const bool isMoving = event->button() == Qt::MiddleButton && drag_ && gesture_ == Gesture::None;
+  if ((event->button() != Qt::LeftButton && !isMoving) || content_.IsEmpty()) return QWidget::mousePressEvent(event);
   setFocus(Qt::MouseFocusReason);
   pressedAt_ = draggedTo_ = event->position();
   isSecondClick_ = isTaken_ = false;
+  if (drag_ && !isMoving && window_.rect.contains(pressedAt_)) {
+    gesture_ = Gesture::Drag;
+    isPointed_ = true;
+    if (drag_->moved) drag_->moved(window_.ToMap(pressedAt_), window_.ToMap(pressedAt_));
+    return update();
+  }
   gesture_ = event->modifiers() & Qt::ShiftModifier ? Gesture::Box : Gesture::Press;
 }
 
@@ -65,7 +72,8 @@ void MapCanvas::mouseMoveEvent(QMouseEvent* event) {
     setCursor(Qt::ClosedHandCursor);
   }
   if (gesture_ == Gesture::Pan) Pan(at - draggedTo_);
-  if (gesture_ == Gesture::Box) update();
+  if (gesture_ == Gesture::Box || drag_) update();
+  if (gesture_ == Gesture::Drag && drag_->moved) drag_->moved(window_.ToMap(draggedTo_), window_.ToMap(at));
   draggedTo_ = at;
   isPointed_ = true;
   const bool isOnMap = !content_.IsEmpty() && window_.rect.contains(at);
@@ -81,7 +89,9 @@ void MapCanvas::mouseReleaseEvent(QMouseEvent* event) {
     isTaken_ = false;  // no double click follows
     return;
   }
-  if (event->button() != Qt::LeftButton) return QWidget::mouseReleaseEvent(event);
+  const bool isMoved = event->button() == Qt::MiddleButton && (gesture_ == Gesture::Pan || gesture_ == Gesture::Press);
+  if (event->button() != Qt::LeftButton && !isMoved) return QWidget::mouseReleaseEvent(event);
+  if (gesture_ == Gesture::Drag) return EndDrag(window_.ToMap(event->position()));
   const Gesture gesture = std::exchange(gesture_, Gesture::None);
   SyncCursor();
   const QPointF at = event->position();
@@ -93,7 +103,7 @@ void MapCanvas::mouseReleaseEvent(QMouseEvent* event) {
       window_.centre = centre;
     }
     Redraw();
-  } else if (gesture == Gesture::Press && !isSecondClick_ && window_.rect.contains(at)) {
+  } else if (gesture == Gesture::Press && !isMoved && !isSecondClick_ && window_.rect.contains(at)) {
     if (request_) return TakeClick(window_.ToMap(at));
     // The page may be replaced by what the click does.
     const auto picked = content_.picked;
@@ -104,6 +114,8 @@ void MapCanvas::mouseReleaseEvent(QMouseEvent* event) {
 void MapCanvas::mouseDoubleClickEvent(QMouseEvent* event) {
   if (event->button() != Qt::LeftButton) return;
   isSecondClick_ = true;
+  // The second of two quick dabs is one, too.
+  if (drag_) return mousePressEvent(event);
   if (request_) return EndLine();
   // The second click upon one that gave a point is none of its own.
   if (!std::exchange(isTaken_, false)) Fit();
@@ -145,6 +157,7 @@ void MapCanvas::keyPressEvent(QKeyEvent* event) {
     case Qt::Key_Home:
       return Fit();
     case Qt::Key_Escape:
+      if (gesture_ == Gesture::Drag) return EndDrag({});
       gesture_ = Gesture::None;
       return update();
     default:
@@ -152,9 +165,22 @@ void MapCanvas::keyPressEvent(QKeyEvent* event) {
   }
 }
 
+void MapCanvas::SetDrag(std::optional<MapDrag> drag) {
+  if (gesture_ == Gesture::Drag) EndDrag({});
+  drag_ = std::move(drag);
+  update();
+}
+
+void MapCanvas::EndDrag(std::optional<MapPoint> place) {
+  gesture_ = Gesture::None;
+  // It may be another one behind that.
+  if (const auto ended = drag_->ended) ended(place);
+  update();
+}
+
 void MapCanvas::leaveEvent(QEvent* /*event*/) {
   isPointed_ = false;
-  if (!drawn_.empty()) update();
+  if (!drawn_.empty() || drag_) update();
   emit PointedAt({});
 }
 

@@ -88,49 +88,90 @@ std::shared_ptr<const GridPicture> GridPicture::Make(const GridLayer& layer, con
   auto picture = std::make_shared<GridPicture>();
   picture->geometry_ = layer.grid->Geometry();
   picture->palette_ = MapPalette::Of(layer, &units);
-  const auto rowLength = static_cast<std::size_t>(picture->geometry_.nx);
-  Level finest{picture->geometry_.nx, picture->geometry_.ny, {}};
+  if (layer.isHillshaded && !layer.isCodes) picture->palette_.MakeShades();
+  const int nx = picture->geometry_.nx, ny = picture->geometry_.ny;
+  Level finest{nx, ny, {}};
   finest.colors.resize(picture->geometry_.CellCount());
-  std::vector<std::size_t> cellsOfColor(MapPalette::kMostColors + 1);
-  const std::vector<float>& values = layer.grid->Values();
-  std::optional<Hillshade> hillshade;
-  if (layer.isHillshaded && !layer.isCodes) {
-    hillshade.emplace(*layer.grid);
-    picture->palette_.MakeShades();
-  }
-  // Where no cell is more than another, nobody asks how many there are.
-  const bool countsCells = picture->palette_.KeepsSingleCells();
-  for (std::size_t row = 0; row < static_cast<std::size_t>(finest.ny); ++row) {
-    if (isGivenUp) return nullptr;
-    for (std::size_t cell = row * rowLength; cell < (row + 1) * rowLength; ++cell) {
-      std::uint8_t color = picture->palette_.ColorNumber(values[cell]);
-      if (hillshade && color != 0) color = picture->palette_.Shaded(color, hillshade->ShadeOf(cell));
-      finest.colors[cell] = color;
-      if (countsCells) ++cellsOfColor[color];
-    }
-  }
   picture->levels_.push_back(std::move(finest));
+  picture->cellsOfColor_.resize(MapPalette::kMostColors + 1);
+  // All cells were empty until now.
+  picture->cellsOfColor_[0] = picture->geometry_.CellCount();
+  constexpr int kRows = 64;
+  for (int row = 0; row < ny; row += kRows) {
+    if (isGivenUp) return nullptr;
+    picture->Paint(layer, {0, row, nx, std::min(kRows, ny - row)});
+  }
   constexpr int kCoarsest = 64;
   while (std::max(picture->levels_.back().nx, picture->levels_.back().ny) > kCoarsest) {
     if (isGivenUp) return nullptr;
-    picture->levels_.push_back(picture->Halved(picture->levels_.back(), cellsOfColor));
+    const Level& finer = picture->levels_.back();
+    Level level{(finer.nx + 1) / 2, (finer.ny + 1) / 2, {}};
+    level.colors.resize(static_cast<std::size_t>(level.nx) * static_cast<std::size_t>(level.ny));
+    picture->Halve(finer, level, {0, 0, level.nx, level.ny});
+    picture->levels_.push_back(std::move(level));
   }
   return picture;
 }
 
-GridPicture::Level GridPicture::Halved(const Level& finer, const std::vector<std::size_t>& cellsOfColor) const {
-  Level level{(finer.nx + 1) / 2, (finer.ny + 1) / 2, {}};
-  level.colors.resize(static_cast<std::size_t>(level.nx) * static_cast<std::size_t>(level.ny));
+void GridPicture::Update(const GridLayer& layer, const CellWindow& cells) {
+  CellWindow changed = cells;
+  const auto clip = [](CellWindow& window, int nx, int ny) {
+    const int right = std::min(window.i + window.nx, nx), top = std::min(window.j + window.ny, ny);
+    window.i = std::max(window.i, 0);
+    window.j = std::max(window.j, 0);
+    window.nx = right - window.i;
+    window.ny = top - window.j;
+  };
+  // How the neighbours are lit follows from a cell, too.
+  if (layer.isHillshaded && !layer.isCodes) changed = {cells.i - 1, cells.j - 1, cells.nx + 2, cells.ny + 2};
+  clip(changed, geometry_.nx, geometry_.ny);
+  if (changed.nx <= 0 || changed.ny <= 0) return;
+  Paint(layer, changed);
+  for (std::size_t number = 1; number < levels_.size(); ++number) {
+    const int right = (changed.i + changed.nx - 1) / 2, top = (changed.j + changed.ny - 1) / 2;
+    changed.i /= 2;
+    changed.j /= 2;
+    changed.nx = right + 1 - changed.i;
+    changed.ny = top + 1 - changed.j;
+    clip(changed, levels_[number].nx, levels_[number].ny);
+    Halve(levels_[number - 1], levels_[number], changed);
+  }
+}
+
+void GridPicture::Paint(const GridLayer& layer, const CellWindow& cells) {
+  std::optional<Hillshade> hillshade;
+  if (layer.isHillshaded && !layer.isCodes) hillshade.emplace(*layer.grid);
+  // Where no cell is more than another, nobody asks how many there are.
+  const bool countsCells = palette_.KeepsSingleCells();
+  const std::vector<float>& values = layer.grid->Values();
+  std::vector<std::uint8_t>& colors = levels_.front().colors;
+  for (int j = cells.j; j < cells.j + cells.ny; ++j) {
+    const std::size_t first =
+        static_cast<std::size_t>(j) * static_cast<std::size_t>(geometry_.nx) + static_cast<std::size_t>(cells.i);
+    for (std::size_t cell = first; cell < first + static_cast<std::size_t>(cells.nx); ++cell) {
+      std::uint8_t color = palette_.ColorNumber(values[cell]);
+      if (hillshade && color != 0) color = palette_.Shaded(color, hillshade->ShadeOf(cell));
+      if (countsCells) {
+        --cellsOfColor_[colors[cell]];
+        ++cellsOfColor_[color];
+      }
+      colors[cell] = color;
+    }
+  }
+}
+
+void GridPicture::Halve(const Level& finer, Level& level, const CellWindow& cells) const {
   // An empty cell never stands for others. Of codes the rarest one does, so that a single cell of it stays visible.
   std::array<std::size_t, MapPalette::kMostColors + 1> rank{};
   for (std::size_t color = 0; color < rank.size(); ++color)
-    rank[color] = palette_.KeepsSingleCells() ? cellsOfColor[color] : 1;
+    rank[color] = palette_.KeepsSingleCells() ? cellsOfColor_[color] : 1;
   rank[0] = std::numeric_limits<std::size_t>::max();
-  std::size_t out = 0;
-  for (int j = 0; j < level.ny; ++j) {
+  for (int j = cells.j; j < cells.j + cells.ny; ++j) {
     const std::uint8_t* lower = &finer.colors[static_cast<std::size_t>(2 * j) * static_cast<std::size_t>(finer.nx)];
     const std::uint8_t* upper = 2 * j + 1 < finer.ny ? lower + finer.nx : lower;
-    for (int i = 0; i < level.nx; ++i) {
+    std::size_t out =
+        static_cast<std::size_t>(j) * static_cast<std::size_t>(level.nx) + static_cast<std::size_t>(cells.i);
+    for (int i = cells.i; i < cells.i + cells.nx; ++i) {
       const int left = 2 * i, right = std::min(left + 1, finer.nx - 1);
       std::uint8_t best = lower[left];
       for (const std::uint8_t other : {lower[right], upper[left], upper[right]})
@@ -138,7 +179,6 @@ GridPicture::Level GridPicture::Halved(const Level& finer, const std::vector<std
       level.colors[out++] = best;
     }
   }
-  return level;
 }
 
 const GridPicture::Level& GridPicture::LevelFor(double cellsPerPixel, int& number) const {

@@ -12,6 +12,7 @@
 #include <optional>
 #include <vector>
 
+#include "data/file_geometry.h"
 #include "forms/plots.h"
 #include "shell/maps/map_drawing.h"
 #include "shell/maps/map_palette.h"
@@ -25,6 +26,9 @@ class GridPicture {
   static std::shared_ptr<const GridPicture> Make(const GridLayer& layer, const DisplayUnits& units,
                                                  const std::atomic<bool>& isGivenUp);
 
+  /// Cells of the layer have other values; the colours stay. Only of a picture that nobody else draws.
+  void Update(const GridLayer& layer, const CellWindow& cells);
+
   const MapPalette& Palette() const { return palette_; }
   /// Draws what the window shows of the grid; `pixelRatio` is that of the device.
   void Draw(QPainter& painter, const MapWindow& window, double pixelRatio, double opacity) const;
@@ -35,12 +39,16 @@ class GridPicture {
     std::vector<std::uint8_t> colors;
   };
 
-  Level Halved(const Level& finer, const std::vector<std::size_t>& cellsOfColor) const;
+  /// Colours for those cells of the finest level.
+  void Paint(const GridLayer& layer, const CellWindow& cells);
+  /// The next coarser level of those cells.
+  void Halve(const Level& finer, Level& level, const CellWindow& cells) const;
   const Level& LevelFor(double cellsPerPixel, int& number) const;
 
   GridGeometry geometry_;
   MapPalette palette_;
   std::vector<Level> levels_;
+  std::vector<std::size_t> cellsOfColor_;  ///< As far as anybody asks how many there are.
 };
 
 }  // namespace tervane
