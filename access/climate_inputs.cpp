@@ -118,4 +118,17 @@ int DefineGrids(KvfFile* definition, const ClimateInputs& inputs) {
   return grid ? 1 : 0;
 }
 
+void DefineClimate(KvfFile* definition, const CGlobal& root) {
+  kvfAddTarget(definition, "CCCompare");
+  for (const ClimateFamily& family : kClimateFamilies) {
+    const ClimateInputs inputs(root, family);
+    kvfAddSection(definition, family.section);
+    DefineValues(definition, inputs);
+    DefineSeries(definition, inputs);
+    DefineGrids(definition, inputs);
+    kvfEndSection(definition);
+  }
+  kvfEndSection(definition);
+}
+
 }  // namespace tervane

@@ -54,5 +54,7 @@ class ClimateInputs {
 int DefineValues(KvfFile* definition, const ClimateInputs& inputs);
 int DefineSeries(KvfFile* definition, const ClimateInputs& inputs);
 int DefineGrids(KvfFile* definition, const ClimateInputs& inputs);
+/// Writes a whole definition, with all families.
+void DefineClimate(KvfFile* definition, const CGlobal& root);
 
 }  // namespace tervane

@@ -53,24 +53,11 @@ void ListClimate(const CGlobal& root, bool json, Streams streams) {
 }
 
 /// Counting in the order of the families defines all that there is.
-void DefineAll(const CGlobal& root, KvfFile* file) {
-  kvfAddTarget(file, "CCCompare");
-  for (const ClimateFamily& family : kClimateFamilies) {
-    const ClimateInputs inputs(root, family);
-    kvfAddSection(file, family.section);
-    DefineValues(file, inputs);
-    DefineSeries(file, inputs);
-    DefineGrids(file, inputs);
-    kvfEndSection(file);
-  }
-  kvfEndSection(file);
-}
-
 int WriteDefinition(const CGlobal& root, const ClimateOptions& options, Streams streams) {
   if (RefuseToReplace(options.definition, options.force, streams)) return kCouldNot;
   const OpenKvf file(kvfCreate());
   kvfGetErrorGlb();  // what an earlier writer left
-  DefineAll(root, file.get());
+  DefineClimate(file.get(), root);
   kvfWrite(file.get(), options.definition);
   return kvfGetErrorGlb() == kKvfNoError ? kDone : Refuse(streams, kvfErrorText());
 }
