@@ -24,7 +24,7 @@ OpenKvf ReadAsItStands(const std::string& path, std::string& problem) {
 }  // namespace
 
 FileMerge MergeSetupFiles(const std::string& base, const std::string& mine, const std::string& theirs,
-                          const std::string& path) {
+                          const std::string& path, const MergeChoices& choices) {
   FileMerge merge{};
   std::string& problem = merge.result.problem;
   OpenKvf files[3];
@@ -32,7 +32,7 @@ FileMerge MergeSetupFiles(const std::string& base, const std::string& mine, cons
   for (std::size_t i = 0; i < 3; ++i)
     if (files[i] = ReadAsItStands(*names[i], problem); !files[i]) return merge;
   const OpenKvf merged(kvfCreate());
-  merge.result = MergeSetups(*files[0], *files[1], *files[2], *merged);
+  merge.result = MergeSetups(*files[0], *files[1], *files[2], *merged, choices);
   if (!problem.empty() || !WriteKvfText(*merged, merge.text, problem)) return merge;
   CFlowModelDoc document;
   if (!document.OpenText(merge.text, path)) problem = document.Error();

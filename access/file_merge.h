@@ -17,6 +17,6 @@ struct FileMerge {
 };
 /// Merges files; `path` is where the text will stand.
 FileMerge MergeSetupFiles(const std::string& base, const std::string& mine, const std::string& theirs,
-                          const std::string& path);
+                          const std::string& path, const MergeChoices& choices = {});
 
 }  // namespace tervane

@@ -136,7 +136,8 @@ struct Sides {
 
 class Merger {
  public:
-  Merger(KvfFile& merged, MergeResult& result) : merged_(merged), result_(result) {}
+  Merger(KvfFile& merged, MergeResult& result, const MergeChoices& choices)
+      : merged_(merged), result_(result), choices_(choices) {}
 
   /// What becomes of a section that at least one side has; `above` is the one in which it stands.
   void MergeInto(KvfSection& to, const Sides& from, const Sides& above, const std::string& path) {
@@ -147,7 +148,13 @@ class Merger {
   }
 
  private:
-  void Report(MergeConflict conflict) { result_.conflicts.push_back(std::move(conflict)); }
+  /// Which side is taken of it.
+  MergeSide Report(MergeConflict conflict) {
+    if (const auto chosen = choices_.find(conflict.Identity()); chosen != choices_.end())
+      conflict.taken = chosen->second;
+    result_.conflicts.push_back(std::move(conflict));
+    return result_.conflicts.back().taken;
+  }
 
   // ---- Keys
 
@@ -164,19 +171,22 @@ class Merger {
   void MergeKeys(KvfSection& to, const Sides& from, const Sides& above, const std::string& path) {
     const Keys old = KeysOf(from.base), own = KeysOf(from.mine), other = KeysOf(from.theirs);
     const auto merge = [&](std::string_view name) {
+      const auto* oldLines = FindKey(old, name);
       const auto* ownLines = FindKey(own, name);
       const auto* otherLines = FindKey(other, name);
-      const auto was = TextOf(FindKey(old, name)), isMine = TextOf(ownLines), isTheirs = TextOf(otherLines);
+      const auto was = TextOf(oldLines), isMine = TextOf(ownLines), isTheirs = TextOf(otherLines);
       const bool isTheirChange = isTheirs != was && !IsMadeAtEachSave(name), isMyChange = isMine != was;
       const bool takesTheirs = isTheirChange && !isMyChange;
-      if (const auto* lines = takesTheirs ? otherLines : ownLines) CopyKey(to, *lines);
       // Numbers of items are counted when the items are there.
-      if (!isTheirChange || isMine == isTheirs || IsCount(name, from, above)) return;
-      if (takesTheirs)
+      const bool isTold = isTheirChange && isMine != isTheirs && !IsCount(name, from, above);
+      MergeSide side = takesTheirs ? MergeSide::Theirs : MergeSide::Mine;
+      if (isTold && takesTheirs)
         ++result_.takenFromThem;
-      else
-        Report({MergeConflict::Kind::Value, path, std::string(name), was.value_or(""), isMine.value_or(""),
-                isTheirs.value_or("")});
+      else if (isTold)
+        side = Report({MergeConflict::Kind::Value, path, std::string(name), was.value_or(""), isMine.value_or(""),
+                       isTheirs.value_or("")});
+      const auto* lines = side == MergeSide::Mine ? ownLines : side == MergeSide::Theirs ? otherLines : oldLines;
+      if (lines) CopyKey(to, *lines);
     };
     for (const auto& [name, lines] : own) merge(name);
     for (const auto& [name, lines] : other)
@@ -276,10 +286,10 @@ class Merger {
     // Mine is the order, unless only they have moved something.
     const bool haveIMoved = !std::ranges::is_sorted(own.Order()),
                haveTheyMoved = !std::ranges::is_sorted(other.Order());
-    if (haveIMoved && haveTheyMoved && own.Order() != other.Order())
-      Report({MergeConflict::Kind::Order, path, {}, {}, kind, {}});
-    const bool byThem = haveTheyMoved && !haveIMoved;
+    bool byThem = haveTheyMoved && !haveIMoved;
     if (byThem) ++result_.takenFromThem;
+    if (haveIMoved && haveTheyMoved && own.Order() != other.Order())
+      byThem = Report({MergeConflict::Kind::Order, path, {}, {}, kind, {}}) == MergeSide::Theirs;
 
     std::size_t number = 0;
     for (const Sides& item : Arranged(old, own, other, byThem, IsNumbered(kind))) {
@@ -363,16 +373,18 @@ class Merger {
       return true;
     }
     const KvfSection& left = item.mine ? *item.mine : *item.theirs;
-    const bool isChanged = ContentOf(left) != ContentOf(*item.base);
-    if (isChanged)
-      Report({item.mine ? MergeConflict::Kind::DeletedByThem : MergeConflict::Kind::DeletedByMe, path, {}, {}, {}, {}});
-    else if (item.mine)
-      ++result_.takenFromThem;
-    return isChanged && item.mine;
+    if (ContentOf(left) == ContentOf(*item.base)) {
+      if (item.mine) ++result_.takenFromThem;
+      return false;
+    }
+    const auto kind = item.mine ? MergeConflict::Kind::DeletedByThem : MergeConflict::Kind::DeletedByMe;
+    const bool takesTheirs = Report({kind, path, {}, {}, {}, {}}) == MergeSide::Theirs;
+    return item.mine ? !takesTheirs : takesTheirs;
   }
 
   KvfFile& merged_;
   MergeResult& result_;
+  const MergeChoices& choices_;
 };
 
 std::optional<int> VersionOf(KvfFile& file) {
@@ -386,23 +398,30 @@ std::optional<int> VersionOf(KvfFile& file) {
 
 }  // namespace
 
+std::string MergeConflict::Identity() const {
+  return fmt::format("{}|{}|{}|{}", static_cast<int>(kind), path, key, kind == Kind::Order ? mine : std::string());
+}
+
 std::string MergeConflict::Sentence() const {
   const auto told = [](const std::string& value) { return value.empty() ? std::string("nothing") : value; };
+  const bool isTheirs = taken == MergeSide::Theirs;
   switch (kind) {
     case Kind::DeletedByMe:
-      return fmt::format("{}: deleted by me, changed by them; it stays deleted", path);
+      return fmt::format("{}: deleted by me, changed by them; it {}", path, isTheirs ? "comes back" : "stays deleted");
     case Kind::DeletedByThem:
-      return fmt::format("{}: deleted by them, changed by me; it stays", path);
+      return fmt::format("{}: deleted by them, changed by me; it {}", path, isTheirs ? "goes" : "stays");
     case Kind::Order:
-      return fmt::format("{}: both have moved its items {}; my order stays", path, mine);
+      return fmt::format("{}: both have moved its items {}; {} order stays", path, mine, isTheirs ? "their" : "my");
     case Kind::Value:
       break;
   }
-  return fmt::format("{}:{}: it was {}, mine is {}, theirs is {}; mine stays", path, key, told(base), told(mine),
-                     told(theirs));
+  return fmt::format("{}:{}: it was {}, mine is {}, theirs is {}; {}", path, key, told(base), told(mine), told(theirs),
+                     isTheirs                   ? "theirs is taken"
+                     : taken == MergeSide::Base ? "it is as it was"
+                                                : "mine stays");
 }
 
-MergeResult MergeSetups(KvfFile& base, KvfFile& mine, KvfFile& theirs, KvfFile& merged) {
+MergeResult MergeSetups(KvfFile& base, KvfFile& mine, KvfFile& theirs, KvfFile& merged, const MergeChoices& choices) {
   MergeResult result;
   const auto versions = std::array{VersionOf(base), VersionOf(mine), VersionOf(theirs)};
   if (versions[0] != versions[1] || versions[1] != versions[2]) {
@@ -413,7 +432,7 @@ MergeResult MergeSetups(KvfFile& base, KvfFile& mine, KvfFile& theirs, KvfFile& 
     return result;
   }
   merged.header = mine.header;
-  Merger merger(merged, result);
+  Merger merger(merged, result, choices);
   // Targets are told apart by their names.
   std::vector<std::string_view> names;
   for (const KvfFile* file : {&mine, &theirs})

@@ -5,6 +5,7 @@
 // merged and kept like everything else.
 #pragma once
 
+#include <map>
 #include <string>
 #include <vector>
 
@@ -12,7 +13,9 @@
 
 namespace tervane {
 
-/// What both sides have changed in different ways; the merged file holds mine.
+enum class MergeSide { Mine, Theirs, Base };
+
+/// What both sides have changed in different ways; the merged file holds mine, unless another side was chosen.
 struct MergeConflict {
   enum class Kind {
     Value,          ///< A key has another value on each side.
@@ -24,10 +27,18 @@ struct MergeConflict {
   std::string path;                ///< Of the section, in my file or, where that has none, in theirs.
   std::string key;                 ///< Empty when a whole section is meant.
   std::string base, mine, theirs;  ///< As the files hold it; empty where a file has none.
+  MergeSide taken = MergeSide::Mine;
 
+  /// The same for the same conflict of another merge of these files.
+  std::string Identity() const;
+  /// Only a value has something in the base that can be taken.
+  bool HasBase() const { return kind == Kind::Value; }
   /// In plain words, with all three values.
   std::string Sentence() const;
 };
+
+/// Which side is taken, by the identity of the conflict.
+using MergeChoices = std::map<std::string, MergeSide>;
 
 struct MergeResult {
   std::vector<MergeConflict> conflicts;
@@ -38,6 +49,7 @@ struct MergeResult {
 /// Writes into `merged`, which is empty, what comes of the changes of both sides. A change that both have made alike is
 /// none. Items of a list are followed by their name, else their code, else their place; so are those that one side has
 /// moved or renamed. Files of different document versions are refused.
-MergeResult MergeSetups(KvfFile& base, KvfFile& mine, KvfFile& theirs, KvfFile& merged);
+MergeResult MergeSetups(KvfFile& base, KvfFile& mine, KvfFile& theirs, KvfFile& merged,
+                        const MergeChoices& choices = {});
 
 }  // namespace tervane

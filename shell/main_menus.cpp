@@ -137,6 +137,7 @@ void MainWindow::BuildMenus() {
   AddForDocument(file, tr("&What will be saved…"), nullptr, QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_S),
                  [this](DocumentFrame& frame) { ShowChanges(frame); });
   AddForDocument(file, tr("Com&pare With…"), nullptr, {}, [this](DocumentFrame& frame) { Compare(frame); });
+  AddForDocument(file, tr("Mer&ge With…"), nullptr, {}, [this](DocumentFrame& frame) { Merge(frame); });
   AddForDocument(file, tr("&Export as MODFLOW 6…"), nullptr, {},
                  [this](DocumentFrame& frame) { ExportToModflow6(frame.Session().Document(), host_); });
   file->addSeparator();

@@ -47,6 +47,10 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   void Compare(DocumentFrame& frame);
   /// The same with the setup of a file; false, with a message, where it cannot be read.
   bool CompareWith(DocumentFrame& frame, const std::string& path);
+  /// Asks for a setup that was made from the same one as this, and for that one, and shows what comes of merging them.
+  void Merge(DocumentFrame& frame);
+  /// The same with these files; false, with a message, where they cannot be merged.
+  bool MergeWith(DocumentFrame& frame, const std::string& theirs, const std::string& base);
   /// Shows the latest run of a document beside the one of a passport; false, with a message, where one cannot be read.
   bool CompareRunWith(DocumentFrame& frame, const std::string& passport);
   /// Shows a data file in a tab of its own, a text file in the desktop's editor. False when neither can be done; the

@@ -21,13 +21,14 @@ using testing::IsEmpty;
 class Merge : public testing::Test {
  protected:
   /// Merges setups of these sections; what comes out, without the target and the version.
-  std::string Of(const std::string& base, const std::string& mine, const std::string& theirs) {
+  std::string Of(const std::string& base, const std::string& mine, const std::string& theirs,
+                 const MergeChoices& choices = {}) {
     const auto open = [this](const char* name, const std::string& sections) {
       return OpenKvf(kvfLoadFile(folder.Write(name, test::SetupText(14, sections)), 0));
     };
     const OpenKvf a = open("base.tvd", base), b = open("mine.tvd", mine), c = open("theirs.tvd", theirs);
     const OpenKvf merged(kvfCreate());
-    result = MergeSetups(*a, *b, *c, *merged);
+    result = MergeSetups(*a, *b, *c, *merged, choices);
     conflicts.clear();
     for (const MergeConflict& conflict : result.conflicts) conflicts.push_back(conflict.Sentence());
     std::string text;
@@ -99,6 +100,33 @@ TEST_F(Merge, ItemsAreFollowedByTheirNames) {
     EXPECT_EQ(Of(List(row.base), List(row.mine), List(row.theirs)), List(row.merged))
         << row.mine << " | " << row.theirs;
     EXPECT_EQ(conflicts, row.conflicts) << row.mine << " | " << row.theirs;
+  }
+}
+
+TEST_F(Merge, OfAConflictTheChosenSideIsTaken) {
+  const struct {
+    std::string base, mine, theirs, ofTheirs, ofBase;
+    const char* told;
+  } cases[] = {
+      {Section("  a = 1\n"), Section("  a = 3\n"), Section("  a = 4\n"), Section("  a = 4\n"), Section("  a = 1\n"),
+       "S:a: it was 1, mine is 3, theirs is 4; theirs is taken"},
+      {Section("  a = 1\n"), Section(""), Section("  a = 4\n"), Section("  a = 4\n"), Section("  a = 1\n"),
+       "S:a: it was 1, mine is nothing, theirs is 4; theirs is taken"},
+      {List("a1 b2"), List("a1"), List("a1 b3"), List("a1 b3"), {}, "deleted by me, changed by them; it comes back"},
+      {List("a1 b2"), List("a1 b3"), List("a1"), List("a1"), {}, "deleted by them, changed by me; it goes"},
+      {List("a1 b2 c3"), List("b2 a1 c3"), List("c3 a1 b2"), List("c3 a1 b2"), {}, "their order stays"},
+  };
+  for (const auto& row : cases) {
+    const std::string ofMine = Of(row.base, row.mine, row.theirs);
+    ASSERT_EQ(result.conflicts.size(), 1U) << row.told;
+    EXPECT_EQ(ofMine, row.mine) << row.told;
+    const MergeConflict conflict = result.conflicts.front();
+    EXPECT_EQ(Of(row.base, row.mine, row.theirs, {{conflict.Identity(), MergeSide::Theirs}}), row.ofTheirs);
+    EXPECT_THAT(conflicts, ElementsAre(HasSubstr(row.told)));
+    EXPECT_EQ(conflict.HasBase(), !row.ofBase.empty());
+    if (conflict.HasBase()) {
+      EXPECT_EQ(Of(row.base, row.mine, row.theirs, {{conflict.Identity(), MergeSide::Base}}), row.ofBase);
+    }
   }
 }
 
