@@ -30,6 +30,7 @@
 #include "shell/editors/edit_tab.h"
 #include "shell/ground_window.h"
 #include "shell/main_window.h"
+#include "shell/merge_view.h"
 #include "shell/page/table_view.h"
 #include "shell/program.h"
 #include "shell/run/document_run.h"
@@ -66,6 +67,7 @@ std::pair<QString, QString> TitleAndPath(const QWidget* tab) {
   if (const auto* shown = qobject_cast<const TemplateTab*>(tab)) return {shown->Title(), ToQt(shown->Path())};
   if (const auto* comparison = qobject_cast<const CompareView*>(tab)) return {comparison->Title(), comparison->Path()};
   if (const auto* runs = qobject_cast<const RunComparisonView*>(tab)) return {runs->Title(), {}};
+  if (const auto* merge = qobject_cast<const MergeView*>(tab)) return {merge->Title(), {}};
   return {};
 }
 

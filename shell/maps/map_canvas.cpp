@@ -461,6 +461,7 @@ void MapCanvas::RenderLayers(QPainter& painter, double pixelRatio, bool isScreen
     });
   for (const auto& layer : layers_)
     if (layer->picture) layer->picture->Draw(painter, seen, pixelRatio, 1 - layer->grid.transparency);
+  DrawCellLines(painter);
   DrawVectors(painter, pixelRatio, isScreen);
   DrawFlow(painter);
   DrawMarkers(painter);

@@ -71,6 +71,10 @@ class MapCanvas : public QWidget {
   void WaitUntilReady();
   /// The map as it is seen, with more pixels for paper.
   QImage Picture(double pixelRatio);
+  /// Tells in the legend what the layers of the backdrop are, or no longer.
+  void SetLayersInLegend(bool isOn);
+  /// Draws the borders of a grid's cells where they are not too fine to be seen; nothing for none.
+  void SetCellLines(std::optional<GridGeometry> grid);
   /// An area of the map alone, without what stands around it, transparent where nothing lies. It fills the picture.
   QImage AreaPicture(const Envelope& area, QSize pixels);
   /// What is shown when everything is.
@@ -133,6 +137,8 @@ class MapCanvas : public QWidget {
   QString DrawnText(MapPoint place) const;
   /// What the legend tells, from the top down.
   std::vector<LegendBlock> Legends() const;
+  LegendBlock LegendOfLayers() const;
+  void DrawCellLines(QPainter& painter) const;
   /// On the screen what has no room is reached by scrolling; on paper it is counted.
   void DrawLegends(QPainter& painter, bool isScreen);
   void ScrollLegend(double pixels);
@@ -172,6 +178,8 @@ class MapCanvas : public QWidget {
   bool isSecondClick_ = false;
   bool isTaken_ = false;    ///< The last click gave a point that was asked for.
   bool isPointed_ = false;  ///< The pointer is over the map.
+  bool hasLayersInLegend_ = false;
+  std::optional<GridGeometry> cellLines_;
   bool isPassing_ = false;  ///< The first grid has but some of its cells.
   QPointF pressedAt_, draggedTo_;
 };

@@ -73,7 +73,37 @@ std::vector<LegendBlock> MapCanvas::Legends() const {
     legend.opacity = 1 - (*layer)->grid.transparency;
     all.push_back(std::move(legend));
   }
+  if (hasLayersInLegend_) add(LegendOfLayers());
   return all;
+}
+
+LegendBlock MapCanvas::LegendOfLayers() const {
+  struct ColorOf {
+    QColor operator()(const ImageLayer& /*image*/) const { return {}; }
+    QColor operator()(const GridLayer& /*grid*/) const { return QColor(RampColor(0.5)); }
+    QColor operator()(const ShapeLayer& shapes) const {
+      const bool arePoints = shapes.shapes && shapes.shapes->Kind() == ShapeKind::Point;
+      if (!shapes.style) return LineColor(isDark);
+      return QColor::fromRgb(arePoints ? shapes.style->pointColor : shapes.style->lineColor);
+    }
+    QColor operator()(const LineLayer& lines) const {
+      return lines.lineColor ? QColor::fromRgb(*lines.lineColor) : LineColor(isDark);
+    }
+    QColor operator()(const PointLayer& /*points*/) const { return InkColor(isDark); }
+
+    bool isDark;
+  };
+  LegendBlock legend;
+  legend.title = tr("Layers");
+  for (const auto* layers : {&content_.above, &content_.below})
+    for (auto layer = layers->rbegin(); layer != layers->rend(); ++layer)
+      legend.Add(std::visit(ColorOf{Theme::Get().IsDark()}, layer->drawn), Translated(layer->title));
+  return legend;
+}
+
+void MapCanvas::SetLayersInLegend(bool isOn) {
+  hasLayersInLegend_ = isOn;
+  Arrange();
 }
 
 QString MapCanvas::HiddenText(std::size_t count) const { return tr("and %n more", nullptr, static_cast<int>(count)); }

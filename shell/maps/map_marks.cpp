@@ -168,4 +168,40 @@ void DrawChip(QPainter& painter, const QRectF& chip, const QString& text, const 
   painter.drawText(chip, Qt::AlignCenter | Qt::TextWordWrap, text);
 }
 
+void MapCanvas::SetCellLines(std::optional<GridGeometry> grid) {
+  cellLines_ = std::move(grid);
+  Redraw();
+}
+
+void MapCanvas::DrawCellLines(QPainter& painter) const {
+  constexpr double kFinest = 4;  // In pixels: nearer to each other they would be a grey veil.
+  if (!cellLines_ || cellLines_->cellSize / window_.metresPerPixel < Scaled(kFinest)) return;
+  const GridTransform transform(*cellLines_);
+  // Only the cells that are seen, however large the grid is.
+  double low[2] = {1e300, 1e300}, high[2] = {-1e300, -1e300};
+  const QRectF seen = window_.rect;
+  for (const QPointF corner : {seen.topLeft(), seen.topRight(), seen.bottomLeft(), seen.bottomRight()}) {
+    const MapPoint cells = transform.ToCells(window_.ToMap(corner));
+    low[0] = std::min(low[0], cells.x);
+    high[0] = std::max(high[0], cells.x);
+    low[1] = std::min(low[1], cells.y);
+    high[1] = std::max(high[1], cells.y);
+  }
+  const auto border = [](double cells, int count) {
+    return static_cast<int>(std::clamp(cells, 0.0, static_cast<double>(count)));
+  };
+  const int left = border(std::floor(low[0]), cellLines_->nx), right = border(std::ceil(high[0]), cellLines_->nx);
+  const int bottom = border(std::floor(low[1]), cellLines_->ny), top = border(std::ceil(high[1]), cellLines_->ny);
+  const auto at = [&](int i, int j) {
+    return window_.ToScreen(transform.ToWorld({static_cast<double>(i), static_cast<double>(j)}));
+  };
+  QList<QLineF> lines;
+  for (int i = left; i <= right; ++i) lines << QLineF(at(i, bottom), at(i, top));
+  for (int j = bottom; j <= top; ++j) lines << QLineF(at(left, j), at(right, j));
+  QColor color = InkColor(Theme::Get().IsDark());
+  color.setAlpha(90);
+  painter.setPen(QPen(color, 1));
+  painter.drawLines(lines);
+}
+
 }  // namespace tervane

@@ -3,11 +3,15 @@
 #include "shell/maps/map_view.h"
 
 #include <QCheckBox>
+#include <QDragEnterEvent>
+#include <QDropEvent>
 #include <QHBoxLayout>
 #include <QMenu>
+#include <QMimeData>
 #include <QPointer>
 #include <QSlider>
 #include <QToolButton>
+#include <QUrl>
 #include <QWidgetAction>
 #include <algorithm>
 #include <utility>
@@ -24,6 +28,8 @@ namespace tervane {
 namespace {
 
 constexpr const char* kHillshade = "Maps/Hillshade";
+constexpr const char* kCellLines = "Maps/CellLines";
+constexpr const char* kLayerLegend = "Maps/LayerLegend";
 
 }  // namespace
 
@@ -48,6 +54,56 @@ MapView::MapView(Host& host, QWidget* parent) : PlotFrame(host, parent), canvas_
   });
   hillshade_->setCheckable(true);
   hillshade_->setChecked(Outside().Setting(kHillshade) == "1");
+  // How all maps are looked at.
+  const auto look = [this](const QString& text, const char* setting, QAction*& action) {
+    action = AddCommand(text, [this, setting, &action] {
+      Outside().SetSetting(setting, action->isChecked() ? "1" : "0");
+      SyncLooks();
+    });
+    action->setCheckable(true);
+    action->setChecked(Outside().Setting(setting) == "1");
+  };
+  look(tr("&Grid Lines"), kCellLines, cellLines_);
+  look(tr("&Layers in the Legend"), kLayerLegend, layerLegend_);
+}
+
+void MapView::SyncLooks() {
+  std::optional<GridGeometry> cells;
+  if (cellLines_->isChecked() && modelCells_) cells = modelCells_();
+  if (cellLines_->isChecked() && !cells && !content_.grids.empty()) cells = content_.grids.front().grid->Geometry();
+  canvas_->SetCellLines(std::move(cells));
+  canvas_->SetLayersInLegend(layerLegend_->isChecked());
+}
+
+// ---- Files dropped on the map
+
+void MapView::TakeDrops(std::function<bool(const std::string& path)> wants,
+                        std::function<void(const std::vector<std::string>& paths)> dropped) {
+  wantsFile_ = std::move(wants);
+  dropped_ = std::move(dropped);
+  setAcceptDrops(true);
+}
+
+namespace {
+
+std::vector<std::string> LocalFiles(const QMimeData& data) {
+  std::vector<std::string> paths;
+  for (const QUrl& url : data.urls())
+    if (url.isLocalFile()) paths.push_back(FromQt(url.toLocalFile()));
+  return paths;
+}
+
+}  // namespace
+
+void MapView::dragEnterEvent(QDragEnterEvent* event) {
+  // Other files go to the window.
+  const std::vector<std::string> paths = LocalFiles(*event->mimeData());
+  if (wantsFile_ && !paths.empty() && std::ranges::all_of(paths, wantsFile_)) event->acceptProposedAction();
+}
+
+void MapView::dropEvent(QDropEvent* event) {
+  event->acceptProposedAction();
+  dropped_(LocalFiles(*event->mimeData()));
 }
 
 void MapView::SetHillshade(bool isOn) {
@@ -219,6 +275,7 @@ void MapView::Show(MapContent content, const DisplayUnits* units) {
   content_ = std::move(content);
   layersButton_->setVisible(!content_.below.empty() || !content_.above.empty());
   canvas_->SetContent(AsLookedAt(), units);
+  SyncLooks();
   canvas_->Ask(std::move(request));
   SetStatus(canvas_->Summary());
 }

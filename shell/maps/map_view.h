@@ -42,11 +42,20 @@ class MapView : public PlotFrame {
   /// Tells the ground on which the map lies in its 3D view. It is not asked once the map is gone. Without it, or where
   /// no ground is known, the values of the map's first grid serve as heights.
   void SetGround(std::function<SectionContent()> ground) { ground_ = std::move(ground); }
+  /// Tells the cells of the model, whose borders can be drawn; without it those of the map's first grid are.
+  void SetModelCells(std::function<std::optional<GridGeometry>()> cells) { modelCells_ = std::move(cells); }
+  /// Lets files be dropped on the map; those that `wants` takes are handed to `dropped`.
+  void TakeDrops(std::function<bool(const std::string& path)> wants,
+                 std::function<void(const std::vector<std::string>& paths)> dropped);
   /// Asks for a file and writes the part of the map that is seen as a picture that knows its place, or the values of
   /// the first grid, as the file's name tells.
   void SaveMapAs();
   /// Shows the map from the side, in a window of its own; null where there is nothing to show, which is told.
   ReliefWindow* OpenRelief();
+
+ protected:
+  void dragEnterEvent(QDragEnterEvent* event) override;
+  void dropEvent(QDropEvent* event) override;
 
  private:
   /// Lights the slopes of elevations, or no longer.
@@ -60,7 +69,13 @@ class MapView : public PlotFrame {
 
   MapContent content_;
   std::map<std::string, LayerLook> looks_;  ///< By the layer's title; those that were changed.
+  void SyncLooks();
+
   std::function<SectionContent()> ground_;
+  std::function<std::optional<GridGeometry>()> modelCells_;
+  std::function<bool(const std::string& path)> wantsFile_;
+  std::function<void(const std::vector<std::string>& paths)> dropped_;
+  QAction *cellLines_, *layerLegend_;
   QToolButton* layersButton_;
   MapCanvas* canvas_;
   QAction* hillshade_;

@@ -3,6 +3,7 @@
 #include <QHBoxLayout>
 
 #include "forms/plots.h"
+#include "overlays/dropped_layer.h"
 #include "pages/parts/ground_section.h"
 #include "shell/charts/depth_columns.h"
 #include "shell/charts/section_view.h"
@@ -13,6 +14,7 @@
 #include "shell/page/table_view.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
+#include "spatial/domain.h"
 #include "subsurface/saturated_zone.h"
 
 namespace tervane {
@@ -46,6 +48,16 @@ class MapWidget : public ControlWidget {
     MakeLabel();
     view_ = new MapView(page.Outside());
     view_->SetGround([this, &page] { return GroundOf(page); });
+    view_->SetModelCells([&page]() -> std::optional<GridGeometry> {
+      const auto* domain = page.Node().Important(kDomain);
+      return domain ? std::optional(domain->GetModelGeometry()) : std::nullopt;
+    });
+    // Maps of libraries have no backdrop.
+    if (page.Node().Important(kBackgroundOverlays))
+      view_->TakeDrops(IsLayerFile, [&page](const std::vector<std::string>& paths) {
+        for (const std::string& path : paths) AddLayerOf(page.Node(), path, page.Outside());
+        page.UpdateDoc(kDataChanged | kTreeRebuilt | kRefreshPlots, paths.size() == 1 ? "Add Layer" : "Add Layers");
+      });
     MakeField(view_, true);
   }
   bool GrowsDown() const override { return true; }

@@ -30,7 +30,7 @@ TEST(MergeView, TheChosenSideOfAConflictIsSavedAndTheSetupIsReadAnew) {
   ASSERT_TRUE(setup.Window().MergeWith(setup.Frame(), theirs, base));
   auto* view = qobject_cast<MergeView*>(tabs->currentWidget());
   ASSERT_TRUE(view);
-  EXPECT_EQ(view->Title(), "Merge of karup.tvd and theirs.tvd");
+  EXPECT_EQ(tabs->tabText(tabs->currentIndex()), "Merge of karup.tvd and theirs.tvd");
   auto* table = view->findChild<QTableWidget*>();
   ASSERT_EQ(table->rowCount(), 1);
   const auto text = [table](int column) { return table->item(0, column)->text(); };

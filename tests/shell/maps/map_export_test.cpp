@@ -2,6 +2,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/maps/map_export.h"
 
+#include <QDragEnterEvent>
+#include <QDropEvent>
+#include <QMimeData>
+#include <QUrl>
+
 #include <gmock/gmock.h>
 
 #include "data/datafile.h"
@@ -77,6 +82,58 @@ TEST(MapExport, TheMapLiesOnItsGroundInThreeDimensions) {
   ASSERT_TRUE(relief.bodies[0].drape);
   EXPECT_GT(relief.bodies[0].drape->pixels.front() >> 24U, 200U);
   EXPECT_EQ(relief.bodies[0].top.back(), 31);
+}
+
+TEST(MapExport, CellsHaveLinesWhereTheyAreLargeEnough) {
+  ShownMap map(OfGrid());
+  const auto whole = [&map] { return map.Canvas().AreaPicture(kArea, {400, 200}); };
+  const auto coarse = [&map] { return map.Canvas().AreaPicture(kArea, {8, 4}); };
+  const QImage before = whole(), small = coarse();
+  map.Canvas().SetCellLines(kGeometry);
+  EXPECT_NE(whole().pixel(100, 50), before.pixel(100, 50)) << "between two cells";
+  EXPECT_EQ(whole().pixel(150, 50), before.pixel(150, 50)) << "within a cell";
+  EXPECT_EQ(coarse(), small) << "a veil of lines";
+}
+
+TEST(MapExport, LayersOfTheBackdropAreToldInTheLegend) {
+  MapContent content = OfGrid();
+  ShapeLayer shapes{.shapes = test::Square(1000, 1400, 1100, 1200), .style = ShapeStyle{.lineColor = 0x2060a0}};
+  content.above.push_back({"Shape: lakes.shp", std::move(shapes)});
+  ShownMap map(std::move(content));
+  const auto hasColor = [&map] {
+    const QImage picture = map.Canvas().Picture(1);
+    const QRect right(picture.width() * 3 / 4, 0, picture.width() / 4, picture.height());
+    for (int y = right.top(); y < right.bottom(); ++y)
+      for (int x = right.left(); x < right.right(); ++x)
+        if (QColor(picture.pixel(x, y)) == QColor(0x20, 0x60, 0xa0)) return true;
+    return false;
+  };
+  map.Canvas().SetLayersInLegend(false);
+  EXPECT_FALSE(hasColor());
+  map.Canvas().SetLayersInLegend(true);
+  EXPECT_TRUE(hasColor());
+}
+
+TEST(MapExport, FilesThatAreWantedCanBeDropped) {
+  ShownMap map(OfGrid());
+  std::vector<std::string> dropped;
+  map.View().TakeDrops([](const std::string& path) { return path.ends_with(".shp"); },
+                       [&dropped](const std::vector<std::string>& paths) { dropped = paths; });
+  const auto drop = [&map](const QString& path) {
+    QMimeData data;
+    data.setUrls({QUrl::fromLocalFile(path)});
+    QDragEnterEvent enter({10, 10}, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+    enter.ignore();
+    QApplication::sendEvent(&map.View(), &enter);
+    if (!enter.isAccepted()) return false;
+    QDropEvent event({10, 10}, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+    QApplication::sendEvent(&map.View(), &event);
+    return true;
+  };
+  EXPECT_FALSE(drop("/data/notes.txt"));
+  EXPECT_TRUE(dropped.empty());
+  EXPECT_TRUE(drop("/data/lakes.shp"));
+  EXPECT_THAT(dropped, testing::ElementsAre("/data/lakes.shp"));
 }
 
 }  // namespace
