@@ -8,6 +8,7 @@
 
 #include <fmt/format.h>
 
+#include "platform/os.h"
 #include "platform/paths.h"
 
 namespace tervane {
