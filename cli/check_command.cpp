@@ -7,6 +7,7 @@
 #include <fmt/format.h>
 #include <fmt/ostream.h>
 
+#include "cli/check_fixes.h"
 #include "cli/offers.h"
 #include "cli/parts/json.h"
 #include "cli/parts/setup_file.h"
@@ -19,7 +20,8 @@ namespace {
 
 struct CheckOptions {
   std::string file;
-  bool json = false, coverage = false, each = false;
+  bool json = false, coverage = false, each = false, fix = false;
+  FixOptions fixes;
 };
 
 std::string_view KindName(KvfUnread::Kind kind) {
@@ -54,7 +56,9 @@ std::string MendsJson(const CYbSEKvfBase& node, const SetupFinding& finding) {
   return mends.empty() ? std::string() : JsonArray(mends);
 }
 
-void WriteJson(const CYbSEDocument& document, const std::vector<SetupFinding>& findings, std::ostream& out) {
+/// `fixed` is what was fixed, as JSON; empty where nothing was to be.
+void WriteJson(const CYbSEDocument& document, const std::vector<SetupFinding>& findings, const std::string& fixed,
+               std::ostream& out) {
   std::unordered_map<std::uint64_t, const CYbSEKvfBase*> nodes;
   if (!findings.empty()) CollectNodes(document.Root(), nodes);
   const auto mends = [&](const SetupFinding& finding) {
@@ -79,7 +83,8 @@ void WriteJson(const CYbSEDocument& document, const std::vector<SetupFinding>& f
                                   {"line", finding.line > 0 ? std::to_string(finding.line) : std::string()},
                                   {"mends", mends(finding)}}));
   }
-  fmt::print(out, "{}\n", JsonObject({{"findings", JsonArray(found)}, {"unread", JsonArray(notRead)}}));
+  fmt::print(out, "{}\n",
+             JsonObject({{"fixed", fixed}, {"findings", JsonArray(found)}, {"unread", JsonArray(notRead)}}));
 }
 
 void WriteFinding(const std::string& file, const SetupFinding& finding, std::ostream& out) {
@@ -107,14 +112,21 @@ void WriteText(const std::string& file, const std::vector<SetupFinding>& finding
   if (findings.empty()) fmt::print(out, "{}: no findings\n", file);
 }
 
-int CheckCommand(const std::string& file, bool json, bool each, Streams streams) {
+int CheckCommand(const CheckOptions& options, Streams streams) {
+  const std::string& file = options.file;
+  SetupLock lock;
+  if (options.fix && !options.fixes.isDry && !HoldSetup(lock, file, options.fixes.force, streams)) return kCouldNot;
   CFlowModelDoc document;
   if (!OpenSetup(document, file, streams)) return kCouldNot;
+  std::string fixed;
+  FixOptions fixes = options.fixes;
+  fixes.each = options.each;
+  if (options.fix && !FixAndSave(document, file, fixes, options.json ? &fixed : nullptr, streams)) return kCouldNot;
   const std::vector<SetupFinding> findings = FindingsOf(document);
-  if (json)
-    WriteJson(document, findings, streams.out);
+  if (options.json)
+    WriteJson(document, findings, fixed, streams.out);
   else
-    WriteText(file, findings, each, streams.out);
+    WriteText(file, findings, options.each, streams.out);
   return std::ranges::any_of(findings, NeedsAttention) ? kFindings : kDone;
 }
 
@@ -125,11 +137,18 @@ void OfferCheckCommand(CommandOffers& offers) {
   Command check = offers.Offer(
       "check", "List errors, warnings, notes and what the file holds that nothing reads", [offers, options] {
         return options->coverage ? CoverageCommand(options->file, options->json, offers.Output())
-                                 : CheckCommand(options->file, options->json, options->each, offers.Output());
+                                 : CheckCommand(*options, offers.Output());
       });
   AddSetup(check, options->file);
   check.AddFlag("--json", options->json, "As JSON");
   check.AddFlag("--each", options->each, "Each finding on a line, also where many have one cause");
+  check.AddFlag("--fix", options->fix, "Mend what can be mended, tell each value that changes, and save the setup");
+  check.Add("--only", options->fixes.only, "One kind of fix alone; see FIXES").Needs("--fix");
+  check.Add("--search", options->fixes.folder, "The folder below which moved files are searched: the setup's")
+      .Needs("--fix");
+  check.AddFlag("--dry-run", options->fixes.isDry, "Tell what --fix would change, and write nothing").Needs("--fix");
+  check.AddFlag("--force", options->fixes.force, "Save it also where an editor has the setup open").Needs("--fix");
+  check.Footer(kFixesFooter);
   check.AddFlag("--coverage", options->coverage,
                 "Instead, how the data cover simulation and domain, and what the forcings come to each year");
 }

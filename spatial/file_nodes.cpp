@@ -6,6 +6,7 @@
 #include "platform/item_types.h"
 #include "platform/units.h"
 #include "simspec/periods.h"
+#include "spatial/file_fixes.h"
 #include "spatial/placement.h"
 
 namespace tervane {
@@ -55,7 +56,7 @@ int DataFileNode::ValidateData() {
   if (ChecksPeriod())
     if (const std::string reason = WhyNotMet(File.Absolute(), Items, WithSimulationPeriod(SetUpNdsValidation()));
         !reason.empty())
-      AddWarning("The file does not cover the simulation", "FILE_NAME", reason);
+      AddWarning(kNotCovering, "FILE_NAME", reason);
   for (Finding& finding : MisplacementOf(*this, *UsedFile())) AddFinding(std::move(finding));
   return 1;
 }

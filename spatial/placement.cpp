@@ -11,6 +11,7 @@
 #include "platform/paths.h"
 #include "platform/units.h"
 #include "spatial/domain.h"
+#include "spatial/file_fixes.h"
 
 namespace tervane {
 
@@ -110,7 +111,7 @@ std::vector<Finding> FindMisplacement(const FilePlace& place, const GridGeometry
     add(Severity::Warning, "The projection of the file is not known",
         problem + "; its coordinates are taken for those of the model domain");
   } else if (!place.projection.empty() && !own.IsSameAs(wanted) && !(own.IsLocal() && wanted.IsLocal())) {
-    add(Severity::Warning, "The file has another projection than the model domain",
+    add(Severity::Warning, kOtherProjection,
         fmt::format("it is in {}, the domain in {}; its coordinates are taken for those of the domain",
                     NameOf(place.projection), NameOf(domain.projection)));
   }
