@@ -84,8 +84,10 @@ std::string WhyNoProgram(const std::string& path) {
 
 EnginePlaces EnginePlaces::Here(const std::string& setting) {
   const char* environment = std::getenv(kEnginesVariable);
-  const std::string found = FindBesideProgram("engines"), program = os::CodePath();
-  const std::string expected = program.empty() ? "" : fmt::format("{}/engines", FolderOf(program));
+  const std::string code = os::CodePath();
+  // A library that other programs load may stand in a folder of its own.
+  const std::string found = code == os::ProgramPath() ? std::string() : FindBesideProgram("engines");
+  const std::string expected = code.empty() ? "" : fmt::format("{}/engines", FolderOf(code));
   return {setting, environment ? environment : "", found.empty() ? expected : found};
 }
 
