@@ -341,7 +341,7 @@ namespace {
 /// Makes the file anew. The lock must be held.
 class SeriesRewriter {
  public:
-  SeriesRewriter(int from, int to, const DataFileHeader& header, const SeriesOfFile& series)
+  SeriesRewriter(int from, int to, const DataFileHeader& header, const RewrittenSeries& series)
       : from_(from), to_(to), header_(header), series_(series), time_(FindTime(from, header)) {}
 
   int Rewrite() {
@@ -473,7 +473,7 @@ class SeriesRewriter {
 
   int from_, to_;
   const DataFileHeader& header_;
-  const SeriesOfFile& series_;
+  const RewrittenSeries& series_;
   TimeVariables time_;
   std::vector<int> dimensions_;  ///< Of the new file, by the number in the old one.
 };
@@ -497,7 +497,7 @@ int FormatFlags(int file) {
 
 }  // namespace
 
-FileResult RewriteSeries(os::File& from, const std::string& to, const SeriesOfFile& series, ProgressPart progress) {
+FileResult RewriteSeries(os::File& from, const std::string& to, const RewrittenSeries& series, ProgressPart progress) {
   const auto refused = [&](const std::string& reason) {
     return FileResult{fmt::format("cannot write {}: {}; nothing was written", to, reason), {}};
   };

@@ -60,13 +60,14 @@ class DataFileUpdate {
 };
 
 /// Series with other times than their file has.
-struct SeriesOfFile {
+struct RewrittenSeries {
   std::vector<std::int64_t> stamps;       ///< Seconds since 1970-01-01, ascending.
   std::optional<std::int64_t> begin;      ///< Of the first interval; without one, a step before the first stamp.
   std::vector<std::vector<float>> items;  ///< Of each item of the file, in its unit.
 };
 /// Writes the series of a file, held open as above, with other times: in its own format and with all else that it
 /// holds.
-FileResult RewriteSeries(os::File& from, const std::string& to, const SeriesOfFile& series, ProgressPart progress = {});
+FileResult RewriteSeries(os::File& from, const std::string& to, const RewrittenSeries& series,
+                         ProgressPart progress = {});
 
 }  // namespace tervane

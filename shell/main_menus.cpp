@@ -193,6 +193,12 @@ void MainWindow::BuildEditMenu() {
   undo.action->setObjectName("Undo");
   redo.action->setObjectName("Redo");
   edit->addSeparator();
+  Command& values = Add(edit, tr("&Edit Values"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_E), [this] {
+    if (Viewer()) EditDataFile(ToQt(Viewer()->Path()));
+  });
+  values.enabled = [this] { return Viewer() != nullptr; };
+  values.action->setToolTip(tr("Changes the data file that is shown"));
+  edit->addSeparator();
   // The widgets have these keys themselves; the menu shows them, so that they are found.
   const auto forward = [&](const QString& text, const char* operation) {
     connect(edit->addAction(text), &QAction::triggered, this, [this, operation] { CopyToKeyboardWidget(operation); });

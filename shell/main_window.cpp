@@ -20,6 +20,7 @@
 #include <QTimer>
 #include <QToolBar>
 
+#include "data/datafile_facts.h"
 #include "document/edit_session.h"
 #include "execution/run_passport.h"
 #include "libraries/library_kinds.h"
@@ -33,6 +34,8 @@
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
 #include "shell/editors/edit_tab.h"
+#include "shell/editors/exchange_backdrop.h"
+#include "shell/editors/grid_editor.h"
 #include "shell/library_tab.h"
 #include "shell/program.h"
 #include "shell/run/document_run.h"
@@ -56,19 +59,10 @@ bool IsDataFile(const QString& path) {
   return suffix.startsWith("nds") || QStringList{"nc", "tif", "tiff", "asc", "rev"}.contains(suffix);
 }
 
-/// Lines of numbers, which some readers of grids would take as well.
-bool IsNamedAsText(const QString& path) {
-  const QString suffix = QFileInfo(path).suffix().toLower();
-  return suffix == "txt" || suffix == "xyz" || suffix == "csv";
-}
-
-/// By what stands at its begin.
-bool IsText(const std::string& path) {
-  QFile file(ToQt(path));
-  constexpr qint64 kBegin = 4096;
-  if (!file.open(QIODevice::ReadOnly)) return false;
-  const QByteArray begin = file.read(kBegin);
-  return WhyNoText({begin.constData(), static_cast<std::size_t>(begin.size())}).empty();
+/// In the folder of the setup's results: it tells of a run, and is not to be changed.
+bool IsStoredByRun(const CFlowModelDoc& document, const std::string& path) {
+  const std::string folder = document.getResultFolder();
+  return !folder.empty() && RealPath(path).starts_with(RealPath(ResolvedPath(folder, {})) + "/");
 }
 
 /// Setups, and the libraries that setups use.
@@ -81,15 +75,6 @@ std::string OpenFilter() {
 }
 
 const LibraryKind* KindOf(const QString& path) { return LibraryKindOf(FromQt(path)); }
-
-/// Asks whether changes are to be saved before they go.
-int AskForChanges(const QString& name, QWidget* parent) {
-  QMessageBox box(QMessageBox::Question, MainWindow::tr("Close"),
-                  MainWindow::tr("Save the changes to %1 before it is closed?").arg(name),
-                  QMessageBox::Save | QMessageBox::Discard | QMessageBox::Cancel, parent);
-  box.setInformativeText(MainWindow::tr("Changes that are not saved are lost."));
-  return box.exec();
-}
 
 QStringList DroppedFiles(const QMimeData* data) {
   QStringList paths;
@@ -166,7 +151,18 @@ bool MainWindow::Receive(const Message& message) {
   DocumentFrame* const sender = Frame();
   if (sender && IsNamedAsPassport(*path)) return CompareRunWith(*sender, *path);
   const bool isSetup = file.endsWith(".tvd", Qt::CaseInsensitive);
-  if (!(isSetup ? OpenDocument(file) : ShowDataFile(file))) return false;
+  // The setup answers once, and what it answers is kept as long as the file is edited.
+  const auto answer = std::make_shared<CTvnFlowModelData>();
+  if (sender)
+    for (const int request : {kAskLayers, kAskDomain}) sender->Receive({kFrameMessage, request, answer.get()});
+  const bool isResult = sender && IsStoredByRun(sender->Session().Document(), *path);
+  if (!(isSetup ? OpenDocument(file) : isResult ? ShowDataFile(file) : EditDataFile(file))) return false;
+  if (auto* editor = qobject_cast<GridEditor*>(tabs_->currentWidget()); editor && sender) {
+    editor->PutOverMaps([setup = QPointer(sender)](MapContent& map) {
+      if (setup) AddBackdrop(setup->Session().Document().Root(), map);
+    });
+    editor->KeepBackdrop(ExchangeBackdrop(*answer));
+  }
   if (DataViewer* viewer = Viewer(); viewer && sender)
     viewer->PutOverMaps([setup = QPointer(sender)](MapContent& map) {
       if (setup) AddBackdrop(setup->Session().Document().Root(), map);
@@ -175,15 +171,6 @@ bool MainWindow::Receive(const Message& message) {
 }
 
 void MainWindow::NewDocument() { AddFrame(EditSession::New(program_.RecoveryFolder())); }
-
-template <class Tab>
-Tab* MainWindow::TabOf(const std::string& path) const {
-  for (int i = 0; i < tabs_->count(); ++i) {
-    auto* tab = qobject_cast<Tab*>(tabs_->widget(i));
-    if (tab && (tab->Path() == path || IsSameFile(tab->Path(), path))) return tab;
-  }
-  return nullptr;
-}
 
 bool MainWindow::OpenDocument(const QString& path) {
   const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
@@ -287,126 +274,10 @@ bool MainWindow::SaveDocumentAs() {
   return path && frame->Save(*path);
 }
 
-bool MainWindow::ShowDataFile(const QString& path) {
-  const std::string file = path.isEmpty() ? std::string() : FromQt(QFileInfo(path).absoluteFilePath());
-  if (file.empty()) {
-    host_.ShowMessage("No file is chosen.", Host::Icon::Warning);
-    return false;
-  }
-  if (const LibraryKind* kind = KindOf(path)) return OpenLibrary(*kind, path);
-  if (IsNamedAsTemplate(file)) return ShowTemplate(path);
-  if (auto* viewer = TabOf<DataViewer>(file)) {
-    tabs_->setCurrentWidget(viewer);
-    viewer->Reload(false);
-    return true;
-  }
-  std::unique_ptr<DataViewer> viewer;
-  if (!IsNamedAsText(path)) {
-    viewer = std::make_unique<DataViewer>(file, host_, program_.Units());
-    if (viewer->Problem().empty()) {
-      const QString title = viewer->Title();
-      tabs_->setCurrentIndex(tabs_->addTab(viewer.release(), title));
-      SyncCommands();
-      return true;
-    }
-  }
-  if (FileExists(file) && IsText(file) && QDesktopServices::openUrl(QUrl::fromLocalFile(ToQt(file)))) return true;
-  host_.ShowMessage(viewer             ? viewer->Problem()
-                    : FileExists(file) ? FromQt(tr("The desktop has no editor for %1.").arg(ToQt(file)))
-                                       : FromQt(tr("%1 is not there.").arg(ToQt(file))),
-                    Host::Icon::Error);
-  return false;
-}
-
 bool MainWindow::OpenFile(const QString& path) {
   if (Frame() && IsNamedAsPassport(FromQt(path)))
     return CompareRunWith(*Frame(), FromQt(QFileInfo(path).absoluteFilePath()));
   return IsDataFile(path) || KindOf(path) || IsNamedAsTemplate(FromQt(path)) ? ShowDataFile(path) : OpenDocument(path);
-}
-
-EditTab* MainWindow::Editor() const { return qobject_cast<EditTab*>(tabs_->currentWidget()); }
-
-bool MainWindow::OpenLibrary(const LibraryKind& kind, const QString& path) {
-  const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
-  if (auto* library = TabOf<LibraryTab>(file)) {
-    tabs_->setCurrentWidget(library);
-    library->CheckDisk();
-    return true;
-  }
-  auto library = std::make_unique<LibraryTab>(kind, file, host_);
-  if (!library->Editor().Problem().empty()) {
-    host_.ShowMessage(library->Editor().Problem(), Host::Icon::Error);
-    return false;
-  }
-  AddEditor(std::move(library));
-  return true;
-}
-
-void MainWindow::AddEditor(std::unique_ptr<EditTab> editor) {
-  connect(editor.get(), &EditTab::StateChanged, this, &MainWindow::SyncCommands);
-  connect(editor.get(), &EditTab::FileSaved, this, [this] {
-    for (int i = 0; i < tabs_->count(); ++i)
-      if (auto* frame = qobject_cast<DocumentFrame*>(tabs_->widget(i))) frame->FollowFiles();
-  });
-  const QString title = editor->Title();
-  tabs_->setCurrentIndex(tabs_->addTab(editor.release(), title));
-  SyncCommands();
-}
-
-bool MainWindow::ShowTemplate(const QString& path) {
-  const std::string file = FromQt(QFileInfo(path).absoluteFilePath());
-  if (auto* shown = TabOf<TemplateTab>(file)) {
-    tabs_->setCurrentWidget(shown);
-    shown->Reload();
-    return true;
-  }
-  auto made = std::make_unique<TemplateTab>(file, host_);
-  if (!made->Problem().empty()) {
-    host_.ShowMessage(made->Problem(), Host::Icon::Error);
-    return false;
-  }
-  const QString title = made->Title();
-  tabs_->setCurrentIndex(tabs_->addTab(made.release(), title));
-  SyncCommands();
-  return true;
-}
-
-bool MainWindow::SaveEditor() {
-  EditTab* editor = Editor();
-  if (!editor) return false;
-  editor->Commit();
-  if (!editor->File().WhyReadOnly().empty()) return SaveEditorAs();
-  if (FileExists(editor->Path()) && editor->File().IsOtherOnDisk()) {
-    const auto answer = host_.Choose(tr("Another program has changed %1 since it was read.").arg(editor->Name()),
-                                     tr("To reload is to lose your own changes, to save over it those of the other "
-                                        "program; saved under another name, both stay."),
-                                     {tr("&Reload"), tr("Save &As…"), tr("Save &Over It")});
-    if (answer == 0) editor->Reload();
-    if (answer == 1) return SaveEditorAs();
-    if (answer != 2) return false;
-  }
-  return editor->Save(editor->Path());
-}
-
-bool MainWindow::SaveEditorAs() {
-  EditTab* editor = Editor();
-  if (!editor) return false;
-  editor->Commit();
-  const auto path = host_.AskFileToSave(editor->NameQuestion());
-  return path && editor->Save(*path);
-}
-
-bool MainWindow::CloseEditor(EditTab* editor) {
-  tabs_->setCurrentWidget(editor);
-  editor->Commit();
-  if (editor->File().IsModified()) {
-    const int answer = AskForChanges(editor->Name(), this);
-    if (answer == QMessageBox::Save && !SaveEditor()) return false;
-    if (answer != QMessageBox::Save && answer != QMessageBox::Discard) return false;
-  }
-  delete editor;
-  SyncCommands();
-  return true;
 }
 
 void MainWindow::ReloadDocument(DocumentFrame* frame) {
@@ -509,7 +380,7 @@ bool MainWindow::CloseDocument(DocumentFrame* frame) {
   tabs_->setCurrentWidget(frame);
   frame->Commit();
   if (frame->Session().HasChangesToSave()) {
-    const int answer = AskForChanges(frame->Name(), this);
+    const int answer = AskForChanges(frame->Name());
     if (answer == QMessageBox::Save && !SaveDocument()) return false;
     if (answer != QMessageBox::Save && answer != QMessageBox::Discard) return false;
   }

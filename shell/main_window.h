@@ -56,6 +56,9 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   /// Shows a data file in a tab of its own, a text file in the desktop's editor. False when neither can be done; the
   /// user has been told why.
   bool ShowDataFile(const QString& path);
+  /// Opens a data file to be edited in a tab of its own, or shows the one in which it is. What cannot be edited is
+  /// shown as `ShowDataFile` does: what a run has stored, files of other forms, lines.
+  bool EditDataFile(const QString& path);
   /// Opens a library of named entries in a tab of its own, or shows the one in which it is open.
   bool OpenLibrary(const LibraryKind& kind, const QString& path);
   /// Shows a process template in a tab of its own.
@@ -121,6 +124,8 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   /// The tab of that class in which a file is open; null where there is none.
   template <class Tab>
   Tab* TabOf(const std::string& path) const;
+  /// Asks whether changes are to be saved before they go: a button of QMessageBox.
+  int AskForChanges(const QString& name);
   /// Adds a tab that edits a file and shows it.
   void AddEditor(std::unique_ptr<EditTab> editor);
   DocumentFrame* AddFrame(std::unique_ptr<EditSession> session);

@@ -164,7 +164,7 @@ data: time = 1, 2, 3; b = 0, 1, 1, 2, 2, 3; label = "abcd"; place = 7; rain = 1,
         DataFile old;
         ASSERT_EQ(old.Open(path), "");
         const std::int64_t first = old.Time().stamps[0];
-        SeriesOfFile series{
+        RewrittenSeries series{
             {first, first + 3600, first + 7200, first + 90000}, first - 60, {{1, kDeleteValue, 8, 9}, {4, 5, 6, 7}}};
         os::File held = Held();
         const std::string to = folder.File("b.nds0");
