@@ -33,7 +33,11 @@ bool OpenSetup::Open(const std::string& path) {
 bool OpenSetup::Save(const std::string& path) {
   keys_->Forget();
   const std::string& to = path.empty() ? Document().PathName() : path;
-  return to.empty() ? setup_->Refuse("the setup was never saved: a path was expected") : setup_->Save(to);
+  if (to.empty()) return setup_->Refuse("the setup was never saved: a path was expected");
+  const bool hasFolder = !Root().SetupFolder().empty();
+  if (!setup_->Save(to)) return false;
+  if (!hasFolder) keys_->TakeFolder();
+  return true;
 }
 
 bool OpenSetup::CopyTo(OpenSetup& copy, std::string& problem) const {

@@ -227,4 +227,16 @@ std::string SetupKeys::SetRepeated(CYbSEKvfBase& node, std::string_view section,
   return refuse("the setup does not take these values: texts, or whole numbers, were expected");
 }
 
+void SetupKeys::TakeFolder() {
+  Forget();
+  WalkNodes(document_.Root(), [this](const NodePlace& place) {
+    const WrittenAlone written(document_, place.node, true);
+    bool namesFile = false;
+    for (const KvfNode* key = written.section->firstChild; key; key = key->next)
+      if (key->IsKeyword() && key->count > 0 && key->params[0].type == KvfType::Filename)
+        namesFile = namesFile || !key->params[0].Text().empty();
+    if (namesFile) ReadKeysAnew(place.node, *written.section);
+  });
+}
+
 }  // namespace tervane

@@ -46,6 +46,9 @@ class SetupKeys {
   std::string SetRepeated(CYbSEKvfBase& node, std::string_view section, std::string_view key,
                           std::span<const PlainValue> values);
 
+  /// The setup has got the folder of its first file: names of files that were set before start from there now.
+  void TakeFolder();
+
   void Forget() { ++revision_; }
   /// Another number after each change that was told.
   std::uint64_t Revision() const { return revision_; }

@@ -4,6 +4,7 @@
 
 from __future__ import annotations
 
+import os
 from collections.abc import Iterable, Iterator, Mapping, MutableSequence
 from typing import Any, NamedTuple, SupportsIndex, overload
 
@@ -90,6 +91,16 @@ class Node:
     def file(self, key: str) -> str:
         """The absolute path that a key names; empty where it names no file."""
         return self._handle.file(key)
+
+    def choose(self, path: str | os.PathLike[str], item: int = 1) -> None:
+        """Of a node of a data file: names the file, and one of its items, from 1. A relative path starts
+        from the folder of the setup.
+
+            setup.node("Topography/NDS_2D_DATA_FILE").choose("dem.nds2")
+        """
+        self["FILE_NAME"] = os.fspath(path)
+        if "ITEM_NUMBERS" in self:
+            self["ITEM_NUMBERS"] = [item]
 
     def repeated(self, section: str, key: str) -> list[Any]:
         """The values that stand one behind the other in a section of the node that is no node itself."""

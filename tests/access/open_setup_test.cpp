@@ -5,6 +5,7 @@
 #include <gmock/gmock.h>
 
 #include "document/setup_lock.h"
+#include "spatial/file_nodes.h"
 #include "tests/support/setup.h"
 #include "tests/support/temp_folder.h"
 
@@ -90,6 +91,15 @@ TEST(OpenSetup, ACopyIsAlikeAndGoesItsOwnWay) {
   EXPECT_EQ(At(setup, "Species").GetChildCount(), 0);
   EXPECT_FALSE(copy.Save(""));
   EXPECT_TRUE(copy.Save(folder.File("b.tvd"))) << copy.Error();
+}
+
+TEST(OpenSetup, NamesOfFilesStartFromTheFolderOfTheFirstSave) {
+  const test::TempFolder folder;
+  OpenSetup setup;
+  CYbSEKvfBase& file = At(setup, "Topography/NDS_2D_DATA_FILE");
+  EXPECT_EQ(setup.Keys().Set(file, {"FILE_NAME", 1}, "dem.nds2"), "");
+  ASSERT_TRUE(setup.Save(folder.File("a.tvd"))) << setup.Error();
+  EXPECT_EQ(dynamic_cast<DataFileNode&>(file).File.Absolute(), folder.File("dem.nds2"));
 }
 
 TEST(OpenSetup, WhatAnEditorHoldsIsNotSaved) {

@@ -19,10 +19,13 @@ using testing::HasSubstr;
 
 const std::string kExamples = TERVANE_SOURCE_DIR "/examples/";
 
+/// Of the variants of one catchment the one with the most keys.
 std::vector<std::string> Examples() {
   std::vector<std::string> files;
   for (const auto& entry : std::filesystem::recursive_directory_iterator(kExamples))
-    if (entry.path().extension() == ".tvd") files.push_back(entry.path().string());
+    if (entry.path().extension() == ".tvd" &&
+        (entry.path().parent_path().filename() != "rhone" || entry.path().stem() == "rhone_quality"))
+      files.push_back(entry.path().string());
   std::ranges::sort(files);
   return files;
 }
