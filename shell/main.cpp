@@ -41,6 +41,7 @@ struct Typed {
   std::vector<std::string> answers;
   double zoom = 0;
   int delay = -1, slice = 0;
+  bool isEdit = false;
 };
 
 /// "1280x800"
@@ -149,7 +150,9 @@ int Run(const Typed& typed, QApplication& application) {
   if (!typed.size.empty()) window.resize(ParseSize(typed.size));
   window.show();
   for (const std::string& file : typed.files)
-    if (!window.OpenFile(ToQt(file)) && isPicture) return 2;
+    if (!(typed.isEdit && !file.ends_with(".tvd") ? window.EditDataFile(ToQt(file)) : window.OpenFile(ToQt(file))) &&
+        isPicture)
+      return 2;
   if (!typed.page.empty() && (!window.Frame() || !window.Frame()->GoToPath(typed.page))) {
     std::fprintf(stderr, "quarzel: %s: there is no page of that path\n", typed.page.c_str());
     if (isPicture) return 2;
@@ -190,6 +193,7 @@ int main(int argc, char** argv) {
   CLI::App commandLine{"The setup editor of the integrated catchment model Tervane.", "quarzel"};
   Typed typed;
   commandLine.add_option("FILE", typed.files, "Setups (.tvd), libraries (.etv) and data files to open");
+  commandLine.add_flag("--edit", typed.isEdit, "Opens data files to be changed, not only to be looked at");
   commandLine.add_option("--page", typed.page, "The node to show, as Climate/PrecipitationRate");
   commandLine
       .add_option(

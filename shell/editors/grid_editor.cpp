@@ -44,7 +44,9 @@ void DrawOutline(QPainter& painter, const QPolygonF& outline) {
   }
 }
 
-QString ShortNumber(double value) { return std::isfinite(value) ? QString::number(value, 'g', 7) : QString("-"); }
+QString ShortNumber(double value, const QString& unit = {}) {
+  return std::isfinite(value) ? QString::number(value, 'g', 7) + unit : QString("-");
+}
 
 }  // namespace
 
@@ -250,7 +252,15 @@ MapRequest GridEditor::Request(MapRequest::Kind kind, const char* prompt,
 
 void GridEditor::ShowMap() {
   map_->Show(Content(), &units_);
-  count_.start();
+  CountSoon();
+}
+
+void GridEditor::CountSoon() {
+  constexpr std::size_t kAtOnce = 400'000;  // a few milliseconds
+  if (edit_.Grid()->Geometry().CellCount() <= kAtOnce)
+    ShowStatistics();
+  else
+    count_.start();
 }
 
 void GridEditor::WaitForPicture() {
@@ -283,7 +293,7 @@ bool GridEditor::Recolour() {
 void GridEditor::Follow() {
   Recolour();
   table_->Refill();
-  count_.start();
+  CountSoon();
   emit StateChanged();
 }
 
@@ -299,11 +309,11 @@ void GridEditor::ShowStatistics() {
                                         : tr("%L1, all").arg(found.count + found.missing));
   add(tr("With a value"), QString("%L1").arg(found.count));
   add(tr("Missing"), QString("%L1").arg(found.missing));
-  add(tr("Smallest"), ShortNumber(found.smallest) + unit);
-  add(tr("Largest"), ShortNumber(found.largest) + unit);
-  add(tr("Mean"), ShortNumber(found.mean) + unit);
-  add(tr("Deviation"), ShortNumber(found.deviation) + unit);
-  add(tr("Sum"), ShortNumber(found.sum) + unit);
+  add(tr("Smallest"), ShortNumber(found.smallest, unit));
+  add(tr("Largest"), ShortNumber(found.largest, unit));
+  add(tr("Mean"), ShortNumber(found.mean, unit));
+  add(tr("Deviation"), ShortNumber(found.deviation, unit));
+  add(tr("Sum"), ShortNumber(found.sum, unit));
   if (found.area) add(tr("Area"), QString::fromUtf8("%1 km²").arg(ShortNumber(*found.area / 1e6)));
   statistics_->setText("<table>" + rows + "</table>");
 }

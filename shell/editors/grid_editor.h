@@ -68,6 +68,8 @@ class GridEditor : public EditTab {
   /// The user has changed cells: what shows them follows.
   void Follow();
   void ShowStatistics();
+  /// At once, but for large grids.
+  void CountSoon();
   void Tell(const std::string& why);
   /// The value that tools paint: none with an empty field; nothing, and it is told, where no number stands there.
   std::optional<float> Value();

@@ -39,7 +39,9 @@ QString TimeText(const CYbDateTime& time) {
 /// A series whose values hold over the step that ends with their time is drawn in steps.
 bool IsOverSteps(ValueType type) { return type == ValueType::MeanStep || type == ValueType::StepAccumulated; }
 
-QString FigureText(double value) { return std::isfinite(value) ? QString::number(value, 'g', 7) : QString("-"); }
+QString FigureText(double value, const QString& unit) {
+  return std::isfinite(value) ? QString::number(value, 'g', 7) + unit : QString("-");
+}
 
 }  // namespace
 
@@ -87,7 +89,8 @@ SeriesEditor::SeriesEditor(const std::string& path, Host& host) : EditTab(host),
   connect(list_, &QListWidget::itemSelectionChanged, &rest_, qOverload<>(&QTimer::start));
   table_->Reset();
   connect(table_->selectionModel(), &QItemSelectionModel::selectionChanged, this, [this] { ShowStatistics(); });
-  Sync();
+  chart_->Show(Chart());
+  ShowStatistics();
 }
 
 SeriesEditor::~SeriesEditor() = default;
@@ -311,10 +314,10 @@ void SeriesEditor::ShowStatistics() {
     const QString unit = " " + ToQt(ShortUnitOf(edit_.ItemOf(series))).toHtmlEscaped();
     add(tr("Values"), QString("%L1").arg(found.count));
     add(tr("Missing"), QString("%L1").arg(found.missing));
-    add(tr("Smallest"), FigureText(found.smallest) + unit);
-    add(tr("Largest"), FigureText(found.largest) + unit);
-    add(tr("Mean"), FigureText(found.mean) + unit);
-    add(tr("Sum"), FigureText(found.sum) + unit);
+    add(tr("Smallest"), FigureText(found.smallest, unit));
+    add(tr("Largest"), FigureText(found.largest, unit));
+    add(tr("Mean"), FigureText(found.mean, unit));
+    add(tr("Sum"), FigureText(found.sum, unit));
     text += "</table>";
   }
   statistics_->setText(text);
