@@ -11,6 +11,7 @@
 #include "shell/editors/edit_panel.h"
 #include "shell/editors/edit_table.h"
 #include "shell/maps/map_canvas.h"
+#include "shell/maps/map_view.h"
 #include "spatial/data2d.h"
 #include "spatial/domain.h"
 #include "tests/shell/next_answer.h"
@@ -234,6 +235,36 @@ TEST_F(GridEditorTest, TheSetupFollowsASave) {
   EXPECT_TRUE(setup_.Window().SaveEditor());
   EXPECT_EQ(topography->GetGridData()->Value(0, 0), 150);
   EXPECT_FALSE(session.IsModified() && session.Steps().UndoName() == "Refresh");
+}
+
+TEST_F(GridEditorTest, TheSetupIsAskedOnceForWhatLiesAround) {
+  const auto titles = [](GridEditor& editor) {
+    std::vector<std::string> found;
+    const MapContent& content = editor.findChild<MapCanvas*>()->Content();
+    for (const auto* layers : {&content.below, &content.above})
+      for (const BackdropLayer& layer : *layers) found.push_back(layer.title);
+    return found;
+  };
+  EXPECT_THAT(titles(*editor_), testing::IsEmpty()) << "its page offers nothing";
+  setup_.Window().CloseTab(editor_);
+  editor_ = nullptr;
+  setup_.GoTo("Catchment");
+  // As the pages do whose files are edited with the geology in sight.
+  setup_.Session().Document().Global().Requests.layers = true;
+  for (QPushButton* button : setup_.Frame().findChildren<QPushButton*>())
+    if (button->isVisible() && button->text() == "Edit...") button->click();
+  auto* domain = qobject_cast<GridEditor*>(Tabs().currentWidget());
+  ASSERT_TRUE(domain);
+  EXPECT_EQ(domain->Title(), "domain.nds2");
+  const auto& requests = setup_.Window().findChild<DocumentFrame*>()->Session().Document().Global().Requests;
+  EXPECT_FALSE(requests.domain || requests.layers);
+  EXPECT_THAT(titles(*domain), testing::ElementsAre("Model Grid")) << "the levels are not seen at first";
+  EXPECT_THAT(domain->findChild<MapView*>()->LayerTitles(), testing::ElementsAre("Model Grid", "Topography"));
+  // What was answered stays, whatever becomes of the setup.
+  domain->Redraw();
+  ASSERT_EQ(domain->Grid().Apply(CellOperation::Set, 5), "");
+  EXPECT_TRUE(setup_.Window().SaveEditor());
+  EXPECT_THAT(titles(*domain), testing::ElementsAre("Model Grid"));
 }
 
 TEST_F(GridEditorTest, AShownFileIsEditedByItsCommand) {
