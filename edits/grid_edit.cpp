@@ -361,10 +361,13 @@ std::string GridEdit::Burn(const ShapesToBurn& shapes, std::string& note, Progre
                               ? data.ReadShapeFile(shapes.path, progress.Part(0, 0.5))
                               : data.ReadShapeAndDbfFile(shapes.path, shapes.attribute, progress.Part(0, 0.5));
   if (!read.Ok()) return read.error;
-  std::map<std::size_t, float> burnt;
+  std::vector<float> values;
+  CellSet burnt;
   std::size_t withoutCells = 0, withoutValue = 0, number = 0;
   const auto nx = static_cast<std::size_t>(grid_->Geometry().nx);
   try {
+    values = grid_->Values();
+    burnt = Cells();
     for (const Shape& shape : data.GetData()) {
       progress.ThrowIfCancelled();
       progress.Part(0.5, 1).Report(static_cast<double>(number++) / static_cast<double>(data.GetData().size()));
@@ -389,18 +392,24 @@ std::string GridEdit::Burn(const ShapesToBurn& shapes, std::string& note, Progre
       bool isOnGrid = false;
       CellsOf(grid_->Geometry(), shape, data.Kind(), [&](int j, int begin, int end) {
         isOnGrid = isOnGrid || begin < end;
-        for (int i = begin; i < end; ++i)
-          burnt[static_cast<std::size_t>(j) * nx + static_cast<std::size_t>(i)] = static_cast<float>(value);
+        for (int i = begin; i < end; ++i) {
+          const std::size_t cell = static_cast<std::size_t>(j) * nx + static_cast<std::size_t>(i);
+          values[cell] = static_cast<float>(value);
+          burnt.Add(cell);
+        }
       });
       if (!isOnGrid) ++withoutCells;
     }
   } catch (const Cancelled&) {
     return kCancelled;
+  } catch (const std::bad_alloc&) {
+    return "it needs more than the free memory";
   }
   CellRuns runs;
-  for (const auto& [cell, value] : burnt)
-    if (grid_->Values()[cell] != value) runs.Add(cell, value);
-  note = fmt::format("{} shapes gave {} cells their value.", number - withoutCells - withoutValue, burnt.size());
+  burnt.ForEach([&](std::size_t cell) {
+    if (grid_->Values()[cell] != values[cell]) runs.Add(cell, values[cell]);
+  });
+  note = fmt::format("{} shapes gave {} cells their value.", number - withoutCells - withoutValue, burnt.Count());
   if (withoutCells > 0) note += fmt::format(" {} shapes have no cell.", withoutCells);
   if (withoutValue > 0) note += fmt::format(" {} shapes have no number as {}.", withoutValue, shapes.attribute);
   Change("Burn Shapes", std::move(runs));

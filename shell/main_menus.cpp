@@ -280,6 +280,7 @@ void MainWindow::BuildRunMenu() {
   Command& refresh = Add(nullptr, tr("R&efresh"), "refresh", QKeySequence::Refresh, [this] {
     if (Frame()) Frame()->RefreshPlots();
     if (Viewer()) Viewer()->Reload(true);
+    if (Editor()) Editor()->CheckDisk();
   });
   refresh.enabled = [this] { return tabs_->count() > 0; };
   refresh.action->setToolTip(tr("Refresh graphic"));
@@ -376,6 +377,9 @@ void MainWindow::BuildHelpMenu() {
         {"Ctrl+Insert", tr("In a table: insert a row")},
         {"Ctrl+Del", tr("In a table: delete the row")},
         {tr("Ctrl+Up, Ctrl+Down"), tr("In a table: move the row")},
+        {"M, B, L, P, F", tr("In a grid that is edited: move, brush, line, polygon, fill")},
+        {"R, A", tr("In a grid that is edited: select a rectangle, an area")},
+        {"[, ]", tr("In a grid that is edited: a smaller, a larger brush")},
     };
     for (const auto& [key, what] : ofWidgets)
       rows += QString("<tr><td>%1&nbsp;&nbsp;</td><td>%2</td></tr>").arg(key, what);

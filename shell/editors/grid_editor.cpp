@@ -80,6 +80,7 @@ GridEditor::GridEditor(const std::string& path, Host& host) : EditTab(host), edi
     if (item.dimensions < 2) items_->setItemData(items_->count() - 1, 0, Qt::UserRole - 1);  // cannot be chosen
   }
   Sync();
+  for (const std::string& note : edit_.Notes()) panel_->Tell(panel_->Told() + ToQt(note) + "\n");
 }
 
 GridEditor::~GridEditor() {
@@ -88,7 +89,9 @@ GridEditor::~GridEditor() {
 }
 
 void GridEditor::Commit() {
-  if (edit_.IsStroke()) edit_.EndStroke();
+  if (!edit_.Problem().empty()) return;
+  edit_.EndStroke();
+  WaitForPicture();
 }
 
 Host::FileQuestion GridEditor::NameQuestion() const {

@@ -91,6 +91,7 @@ SeriesEditor::SeriesEditor(const std::string& path, Host& host) : EditTab(host),
   connect(table_->selectionModel(), &QItemSelectionModel::selectionChanged, this, [this] { ShowStatistics(); });
   chart_->Show(Chart());
   ShowStatistics();
+  for (const std::string& note : edit_.Notes()) panel_->Tell(panel_->Told() + ToQt(note) + "\n");
 }
 
 SeriesEditor::~SeriesEditor() = default;
