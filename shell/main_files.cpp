@@ -11,9 +11,11 @@
 #include <QUrl>
 
 #include "data/datafile_facts.h"
+#include "document/edit_session.h"
 #include "libraries/library_kinds.h"
 #include "pages/result_view.h"
 #include "platform/files.h"
+#include "platform/paths.h"
 #include "platform/text_fields.h"
 #include "shell/document_frame.h"
 #include "shell/editors/data_viewer.h"
@@ -96,6 +98,19 @@ bool MainWindow::ShowDataFile(const QString& path) {
   return false;
 }
 
+bool MainWindow::IsStoredByRun(const std::string& path) const {
+  const std::string real = RealPath(path);
+  // Beside a setup that nobody has open, its folder has this name.
+  if (real.find("_results/") != std::string::npos) return true;
+  for (int i = 0; i < tabs_->count(); ++i) {
+    const auto* frame = qobject_cast<const DocumentFrame*>(tabs_->widget(i));
+    if (!frame) continue;
+    const std::string folder = frame->Session().Document().getResultFolder();
+    if (!folder.empty() && real.starts_with(RealPath(ResolvedPath(folder, {})) + "/")) return true;
+  }
+  return false;
+}
+
 bool MainWindow::EditDataFile(const QString& path) {
   const std::string file = path.isEmpty() ? std::string() : FromQt(QFileInfo(path).absoluteFilePath());
   if (file.empty() || LibraryKindOf(FromQt(path)) || IsNamedAsTemplate(file) || IsNamedAsText(path) ||
@@ -104,6 +119,11 @@ bool MainWindow::EditDataFile(const QString& path) {
   if (auto* editor = TabOf<EditTab>(file)) {
     tabs_->setCurrentWidget(editor);
     editor->CheckDisk();
+    return true;
+  }
+  if (IsStoredByRun(file)) {
+    if (!ShowDataFile(path)) return false;
+    statusBar()->showMessage(tr("What a run has stored is shown and not changed."), kWhyTold);
     return true;
   }
   const auto facts = DataFileFactsOf(file);

@@ -59,12 +59,6 @@ bool IsDataFile(const QString& path) {
   return suffix.startsWith("nds") || QStringList{"nc", "tif", "tiff", "asc", "rev"}.contains(suffix);
 }
 
-/// In the folder of the setup's results: it tells of a run, and is not to be changed.
-bool IsStoredByRun(const CFlowModelDoc& document, const std::string& path) {
-  const std::string folder = document.getResultFolder();
-  return !folder.empty() && RealPath(path).starts_with(RealPath(ResolvedPath(folder, {})) + "/");
-}
-
 /// Setups, and the libraries that setups use.
 std::string OpenFilter() {
   std::string filter = "Tervane  Flow Model(*.tvd)|*.tvd|";
@@ -155,8 +149,7 @@ bool MainWindow::Receive(const Message& message) {
   const auto answer = std::make_shared<CTvnFlowModelData>();
   if (sender)
     for (const int request : {kAskLayers, kAskDomain}) sender->Receive({kFrameMessage, request, answer.get()});
-  const bool isResult = sender && IsStoredByRun(sender->Session().Document(), *path);
-  if (!(isSetup ? OpenDocument(file) : isResult ? ShowDataFile(file) : EditDataFile(file))) return false;
+  if (!(isSetup ? OpenDocument(file) : EditDataFile(file))) return false;
   if (auto* editor = qobject_cast<GridEditor*>(tabs_->currentWidget()); editor && sender) {
     editor->PutOverMaps([setup = QPointer(sender)](MapContent& map) {
       if (setup) AddBackdrop(setup->Session().Document().Root(), map);

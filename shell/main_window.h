@@ -124,6 +124,8 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   /// The tab of that class in which a file is open; null where there is none.
   template <class Tab>
   Tab* TabOf(const std::string& path) const;
+  /// In the folder of the results of a setup, open or not: it tells of a run, and is not to be changed.
+  bool IsStoredByRun(const std::string& path) const;
   /// Asks whether changes are to be saved before they go: a button of QMessageBox.
   int AskForChanges(const QString& name);
   /// Adds a tab that edits a file and shows it.

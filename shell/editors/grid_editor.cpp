@@ -51,8 +51,9 @@ QString ShortNumber(double value, const QString& unit = {}) {
 }  // namespace
 
 GridEditor::GridEditor(const std::string& path, Host& host) : EditTab(host), edit_(path) {
-  map_ = new MapView(host);
+  // In the order of the keyboard.
   auto* tools = BuildTools();
+  map_ = new MapView(host);
   table_ = BuildTable();
   panel_ = BuildPanel();
   auto* split = new QSplitter(Qt::Vertical);

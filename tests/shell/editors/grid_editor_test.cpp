@@ -277,6 +277,12 @@ TEST_F(GridEditorTest, AShownFileIsEditedByItsCommand) {
   ASSERT_TRUE(codes);
   EXPECT_EQ(codes->Title(), "other.nds2");
   EXPECT_TRUE(codes->Grid().IsCodes());
+  // What a run has stored is shown, opened by its command too.
+  const std::string result = setup_.Folder().Write("karup_results/codes.nds2", test::ReadFile(other));
+  EXPECT_TRUE(setup_.Window().EditDataFile(ToQt(result)));
+  ASSERT_TRUE(qobject_cast<DataViewer*>(Tabs().currentWidget()));
+  setup_.Command("Edit Values");
+  EXPECT_TRUE(qobject_cast<DataViewer*>(Tabs().currentWidget()));
   // What cannot be edited is shown as before.
   const std::string raster =
       setup_.Folder().Write("r.asc", "ncols 2\nnrows 1\nxllcorner 0\nyllcorner 0\ncellsize 1\n5 6\n");
