@@ -45,8 +45,8 @@ py::dict DictOf(const DataItem& item) {
   const FileGeometry& place = item.geometry;
   return py::dict("name"_a = item.name, "item_type"_a = item.itemType, "unit"_a = item.unitText,
                   "value_type"_a = std::string(ValueTypeText(item.valueType)), "dimensions"_a = item.dimensions,
-                  "has_codes"_a = HoldsCodes(item), "nx"_a = place.nx, "ny"_a = place.ny, "nz"_a = place.nz,
-                  "x0"_a = place.x0, "y0"_a = place.y0, "cell_size"_a = place.cellSize,
+                  "has_codes"_a = HoldsCodes(item), "has_time"_a = item.hasTime, "nx"_a = place.nx, "ny"_a = place.ny,
+                  "nz"_a = place.nz, "x0"_a = place.x0, "y0"_a = place.y0, "cell_size"_a = place.cellSize,
                   "cell_height"_a = place.cellHeight, "rotation"_a = place.rotation, "projection"_a = place.projection,
                   "is_geographical"_a = place.isGeographical);
 }
@@ -79,7 +79,8 @@ std::optional<UnitConversion> ConversionOf(const DataFile& file, const DataItem&
 py::array_t<float> Read(const DataFile& file, int number, std::size_t first, std::size_t steps,
                         std::optional<int> layer, const std::optional<std::string>& unit) {
   const DataItem& item = ItemAt(file, number);
-  if (first > file.Time().steps || steps > file.Time().steps - first) throw py::index_error("there is no such step");
+  const std::size_t there = item.hasTime ? file.Time().steps : 1;
+  if (first > there || steps > there - first) throw py::index_error("there is no such step");
   if (layer && (*layer < 0 || *layer >= item.geometry.nz)) throw py::index_error("there is no such layer");
   const std::optional<UnitConversion> conversion = ConversionOf(file, item, unit);
   std::vector<py::ssize_t> shape{static_cast<py::ssize_t>(steps)};

@@ -33,6 +33,8 @@ class Item(NamedTuple):
     """0 a time series, 1 a line, 2 a grid, 3 layers of grids."""
     has_codes: bool
     """Its values are whole numbers that stand for something."""
+    has_time: bool
+    """False for an item that holds at all times, and has one step."""
     nx: int
     ny: int
     nz: int
@@ -112,7 +114,7 @@ class DataFile:
         The memory is numpy's, and other threads go on meanwhile.
         """
         number = self._number(item)
-        count = len(self)
+        count = len(self) if self.items[number - 1].has_time else 1
         if isinstance(steps, int):
             if not -count <= steps < count:
                 raise IndexError(f"{self.path}: there is no step {steps}: it has {count}")
@@ -162,11 +164,13 @@ class DataFile:
             values = self.values(i)
             if item.has_codes:
                 values = numpy.where(values.mask, numpy.nan, values.data.astype(numpy.float32))
-            coordinates: dict[str, Any] = {"time": times} if len(times) else {}
+            coordinates: dict[str, Any] = {"time": times} if item.has_time and len(times) else {}
             if item.dimensions >= 1 and item.cell_size > 0:
                 coordinates["x"] = item.x0 + (numpy.arange(item.nx) + 0.5) * item.cell_size
             if item.dimensions >= 2 and item.cell_size > 0:
                 coordinates["y"] = item.y0 + (numpy.arange(item.ny) + 0.5) * item.cell_height
+            if not item.has_time:
+                values, axes = values[0], axes[1:]
             attributes = {"item_type": item.item_type, "rotation": item.rotation}
             variables[item.name] = xarray.DataArray(values, coordinates, axes, item.name, attributes)
         return xarray.Dataset(variables)

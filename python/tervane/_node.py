@@ -261,5 +261,10 @@ class NodeList(MutableSequence[Node]):
         if not self._handle.move_item(self._place(index), self._place(to)):
             raise TypeError(f"{self._handle.path}: these items have no order of their own")
 
+    def reverse(self) -> None:
+        """Turns the order of the items around."""
+        for place in range(len(self)):
+            self.move(-1, place)
+
     def __repr__(self) -> str:
         return f"<tervane.NodeList {self._handle.path}, {len(self)} items>"

@@ -8,6 +8,8 @@ awk '/^```c$/ { on = 1; next } /^```$/ { on = 0 } on' "$2/docs/manual/programmin
 cc -std=c11 -Wall -Wextra -Werror -I"$2/capi" shorter_steps.c -L"$1" -ltervane -Wl,-rpath,"$1" -o shorter_steps
 # Under the name by which a program that was linked with a version looks for it.
 readelf -d shorter_steps | grep -q 'libtervane.so.0'
+# The earlier names are C as well.
+echo '#include <tervane_names.h>' | cc -std=c99 -Wall -Wextra -pedantic -Werror -I"$2/capi" -x c -fsyntax-only -
 cp "$2/examples/water_quality.tvd" setup.tvd
 ./shorter_steps setup.tvd changed.tvd >output
 cat output

@@ -99,6 +99,9 @@ def test_a_list_is_a_sequence_of_nodes(setup):
     assert names() == ["c", "b"] and species[-1]["Name"] == "b"
     species[0] = {"Name": "d"}
     assert names() == ["d", "b"]
+    species.reverse()
+    assert names() == ["b", "d"]
+    species.reverse()
     with pytest.raises(IndexError):
         species[2]
     with pytest.raises(tervane.KeyNotFound):
