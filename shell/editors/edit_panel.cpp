@@ -8,6 +8,7 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
+#include <QScrollArea>
 #include <QVBoxLayout>
 #include <utility>
 
@@ -31,10 +32,16 @@ EditPanel::EditPanel() {
   told_->setWordWrap(true);
   told_->setTextFormat(Qt::PlainText);
   told_->setTextInteractionFlags(Qt::TextSelectableByMouse);
-  setWidget(body);
-  setWidgetResizable(true);
-  setFrameShape(QFrame::NoFrame);
-  setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+  told_->hide();
+  auto* groups = new QScrollArea;
+  groups->setWidget(body);
+  groups->setWidgetResizable(true);
+  groups->setFrameShape(QFrame::NoFrame);
+  groups->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+  auto* column = new QVBoxLayout(this);
+  column->setContentsMargins(0, 0, 0, 0);
+  column->addWidget(groups, 1);
+  column->addWidget(told_);
   setFixedWidth(Theme::Get().Scaled(kPanelWidth));
   connect(&Theme::Get(), &Theme::Changed, this, [this] { setFixedWidth(Theme::Get().Scaled(kPanelWidth)); });
 }
@@ -104,10 +111,7 @@ QPushButton* EditPanel::Button(const QString& text, const QString& toolTip, Run 
   return button;
 }
 
-void EditPanel::End() {
-  all_->addWidget(told_);
-  all_->addStretch();
-}
+void EditPanel::End() { all_->addStretch(); }
 
 std::optional<double> EditPanel::NumberIn(const QLineEdit& field) {
   const std::optional<double> number = ParseCsvNumber(FromQt(field.text().trimmed()), true);
@@ -115,7 +119,10 @@ std::optional<double> EditPanel::NumberIn(const QLineEdit& field) {
   return number;
 }
 
-void EditPanel::Tell(const QString& text) { told_->setText(text); }
+void EditPanel::Tell(const QString& text) {
+  told_->setText(text);
+  told_->setVisible(!text.isEmpty());
+}
 
 QString EditPanel::Told() const { return told_->text(); }
 

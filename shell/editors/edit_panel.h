@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <QScrollArea>
+#include <QWidget>
 #include <functional>
 #include <optional>
 
@@ -15,9 +15,9 @@ class QVBoxLayout;
 
 namespace tervane {
 
-/// What is done to a file that is edited, beside it: groups of fields with their buttons, and a line that tells what
-/// came of it.
-class EditPanel : public QScrollArea {
+/// What is done to a file that is edited, beside it: groups of fields with their buttons, which are scrolled where they
+/// do not fit, and below them, always in sight, what came of it.
+class EditPanel : public QWidget {
   Q_OBJECT
 
  public:
