@@ -135,7 +135,7 @@ FixKind NumberInRange(SetupKeys& keys) {
 }
 
 FixKind OnlyOffer() {
-  return {"offer", "Take What Is Offered", [](const FoundAt& found) { return SoleOffer(found).has_value(); },
+  return {kSoleOffer, "Take What Is Offered", [](const FoundAt& found) { return SoleOffer(found).has_value(); },
           [](std::span<const FoundAt> found, const FixContext&, FixPlan& plan) {
             for (const FoundAt& finding : found) {
               const std::optional<Mend> mend = SoleOffer(finding);

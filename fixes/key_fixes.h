@@ -19,6 +19,6 @@ FixKind OnlyOffer();
 /// The path that a finding's key names; empty where the key names no file, or the file is there.
 std::string MissedFile(const FoundAt& found);
 
-inline constexpr std::string_view kMovedFile = "moved-file";
+inline constexpr std::string_view kMovedFile = "moved-file", kSoleOffer = "offer";
 
 }  // namespace tervane

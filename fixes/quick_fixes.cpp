@@ -6,7 +6,6 @@
 #include <unordered_map>
 #include <unordered_set>
 
-#include "fixes/key_fixes.h"
 #include "platform/paths.h"
 #include "simspec/period_fixes.h"
 #include "spatial/data_use.h"

@@ -10,6 +10,7 @@
 
 #include "access/setup_keys.h"
 #include "core/fixes.h"
+#include "fixes/key_fixes.h"
 #include "pages/findings.h"
 #include "platform/computation.h"
 #include "platform/file_search.h"
@@ -27,6 +28,8 @@ class QuickFixes {
 
   /// In the order in which they are tried: a file that is found is looked into by those behind.
   const std::vector<FixKind>& Kinds() const { return kinds_; }
+  /// The name of the kind that takes what a node offers.
+  static constexpr std::string_view kOffer = kSoleOffer;
   /// Null for a name that none has.
   const FixKind* KindOf(std::string_view name) const;
   /// Whether files are searched before such a plan is made.

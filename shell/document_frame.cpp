@@ -139,6 +139,7 @@ void DocumentFrame::BuildBody() {
   findings_ = new FindingsView(session_->Document());
   connect(findings_, &FindingsView::FindingChosen, this,
           [this](const SetupFinding& finding) { GoTo(finding.serial, finding.key); });
+  connect(findings_, &FindingsView::FixChosen, this, &DocumentFrame::Fix);
   connect(findings_, &FindingsView::MendChosen, this, [this](quint64 serial, const Mend& mend) {
     Commit();
     CYbSEKvfBase* node = NodeOf(serial);
@@ -303,6 +304,7 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
     ShowWhy(tr("Why Is This Grey?"), {WhyEnabled(session_->Document(), page_->Page().Form(), *asked)},
             tr("can be changed, since"), tr("cannot be changed, since"));
   });
+  OfferFixesOnPage();
   connect(page_, &PageView::UnitChosen, this, [this](int itemType, int unit) {
     program_.ChooseUnit(itemType, unit);
     page_->Sync();

@@ -96,6 +96,9 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   void CheckDisk();
   /// Looks whether a process template in use has changed on disk, and offers to read it again.
   void CheckTemplates();
+  /// Tries a kind of fix for these findings, or for all that it is for where there are none: asks where files are to be
+  /// searched and whether many values are to be changed, and changes them in one step.
+  void Fix(const QString& kind, const std::vector<SetupFinding>& findings);
   void Log(const QString& line);
   /// Makes all anew that was computed from colours and sizes.
   void Redraw();
@@ -126,6 +129,7 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   void Step(bool (EditSession::*step)(), StepPlace (UndoStack::*placeOf)() const,
             std::string (UndoStack::*nameOf)() const, const QString& told);
   void ShowWhyHere(quint64 serial);
+  void OfferFixesOnPage();
   void ShowWhy(const QString& title, const std::vector<Explanation>& explanations, const QString& yes,
                const QString& no);
   void Refresh(int hint);

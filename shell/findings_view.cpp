@@ -10,6 +10,8 @@
 #include <QPainter>
 #include <algorithm>
 
+#include "document/flow_model_document.h"
+#include "fixes/quick_fixes.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/row_delegate.h"
 #include "shell/widgets/theme.h"
@@ -18,7 +20,7 @@ namespace tervane {
 
 namespace {
 
-enum Column { kKindColumn, kPlaceColumn, kTextColumn, kLineColumn };
+enum FindingColumn { kKindColumn, kPlaceColumn, kTextColumn, kLineColumn };
 
 QString PathText(const SetupFinding& finding) {
   return ToQt(finding.key.empty() ? finding.path : finding.path + ":" + finding.key);
@@ -35,7 +37,7 @@ void CollectNodes(CYbSEKvfBase& node, std::unordered_map<std::uint64_t, CYbSEKvf
     CollectNodes(*child, wanted);
 }
 
-QString KindText(SetupFinding::Kind kind) {
+QString TextOfKind(SetupFinding::Kind kind) {
   switch (kind) {
     case SetupFinding::Kind::Error:
       return FindingsView::tr("Error");
@@ -58,7 +60,7 @@ bool SameFindings(const std::vector<SetupFinding>& a, const std::vector<SetupFin
 
 }  // namespace
 
-FindingsView::FindingsView(CYbSEDocument& document) : document_(document) {
+FindingsView::FindingsView(CFlowModelDoc& document) : document_(document) {
   setRootIsDecorated(false);
   setUniformRowHeights(true);
   setAlternatingRowColors(true);
@@ -88,7 +90,7 @@ QTreeWidgetItem* FindingsView::NewLine(const SetupFinding& finding, const QStrin
   const bool isError = finding.kind == SetupFinding::Kind::Error;
   const bool isWarning = finding.kind == SetupFinding::Kind::Warning;
   item->setIcon(kKindColumn, Theme::Get().Icon(isError ? "error" : isWarning ? "warning" : "note"));
-  item->setText(kKindColumn, KindText(finding.kind));
+  item->setText(kKindColumn, TextOfKind(finding.kind));
   item->setText(kPlaceColumn, place.isEmpty() ? PathText(finding) : place);
   item->setText(kTextColumn, text);
   item->setToolTip(kTextColumn, text);
@@ -207,11 +209,15 @@ void FindingsView::FillMenu(QMenu& menu, QTreeWidgetItem* item) {
   });
   const SetupFinding* finding = FindingOfLine(item);
   const bool isGroup = !item->parent() && !groups_[static_cast<std::size_t>(indexOfTopLevelItem(item))].IsOne();
-  if (!finding || !finding->serial || isGroup) return;
+  if (!finding || !finding->serial) return;
   Nodes nodes{{finding->serial, nullptr}};
   CollectNodes(document_.Root(), nodes);
-  const CYbSEKvfBase* node = nodes.begin()->second;
-  const std::vector<Mend> mends = node ? MendsOf(*node, *finding) : std::vector<Mend>();
+  CYbSEKvfBase* node = nodes.begin()->second;
+  if (!node) return;
+  AddFixes(menu, *node,
+           isGroup ? groups_[static_cast<std::size_t>(indexOfTopLevelItem(item))].findings
+                   : std::vector<SetupFinding>{*finding});
+  const std::vector<Mend> mends = isGroup ? std::vector<Mend>() : MendsOf(*node, *finding);
   if (mends.empty()) return;
   menu.addSeparator();
   constexpr std::size_t kFew = 6;
@@ -219,6 +225,21 @@ void FindingsView::FillMenu(QMenu& menu, QTreeWidgetItem* item) {
   for (const Mend& mend : mends)
     offered.addAction(ToQt(mend.text).replace("&", "&&"), this,
                       [this, serial = finding->serial, mend] { emit MendChosen(serial, mend); });
+}
+
+void FindingsView::AddFixes(QMenu& menu, CYbSEKvfBase& node, const std::vector<SetupFinding>& findings) {
+  const QuickFixes fixes(document_);
+  for (const FixKind* kind : fixes.KindsFor(node, findings.front())) {
+    // What a finding offers stands below by its own name.
+    if (kind->name == QuickFixes::kOffer && findings.size() == 1) continue;
+    const QString title = Translated(std::string(kind->title)), name = ToQt(std::string(kind->name));
+    menu.addSeparator();
+    menu.addAction(findings.size() == 1 ? title : tr("%1 at %2 Places").arg(title).arg(findings.size()), this,
+                   [this, name, findings] { emit FixChosen(name, findings); });
+    const std::size_t all = fixes.FoundFor(*kind, findings_).size();
+    if (all > findings.size())
+      menu.addAction(tr("Fix All %1 of This Kind").arg(all), this, [this, name] { emit FixChosen(name, {}); });
+  }
 }
 
 void FindingsView::contextMenuEvent(QContextMenuEvent* event) {

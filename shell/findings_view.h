@@ -13,26 +13,30 @@ class QMenu;
 
 namespace tervane {
 
+class CFlowModelDoc;
+
 /// All that is wrong in a setup, as a list; choosing one leads to its place. Findings of one cause are one line with
 /// their number, which opens.
 class FindingsView : public QTreeWidget {
   Q_OBJECT
 
  public:
-  explicit FindingsView(CYbSEDocument& document);
+  explicit FindingsView(CFlowModelDoc& document);
 
   void Show(std::vector<SetupFinding> findings);
   /// The number of errors and warnings that hold now.
   int Count() const;
   /// Chooses the next or the previous line.
   void Step(int by);
-  /// The commands of a line, with what mends its finding.
+  /// The commands of a line, with what mends its findings.
   void FillMenu(QMenu& menu, QTreeWidgetItem* item);
 
  signals:
   void FindingChosen(const SetupFinding& finding);
   /// What the node of that serial offers is to be done.
   void MendChosen(quint64 serial, const Mend& mend);
+  /// The kind of fix of that name is to be tried for these findings; for all that it is for where there are none.
+  void FixChosen(const QString& kind, const std::vector<SetupFinding>& findings);
 
  protected:
   void paintEvent(QPaintEvent* event) override;
@@ -48,8 +52,10 @@ class FindingsView : public QTreeWidget {
   /// Makes the lines of a group when it is first opened.
   void Fill(QTreeWidgetItem* item);
   Nodes NodesOfFindings() const;
+  /// The fixes for the findings of a line whose first one stands at the node.
+  void AddFixes(QMenu& menu, CYbSEKvfBase& node, const std::vector<SetupFinding>& findings);
 
-  CYbSEDocument& document_;
+  CFlowModelDoc& document_;
   std::vector<SetupFinding> findings_;
   std::vector<FindingGroup> groups_;  ///< One for each line that stands at the left.
 };

@@ -16,7 +16,7 @@ namespace tervane {
 
 namespace {
 
-enum ReasonRole { kSerialRole = Qt::UserRole, kKeyRole };
+enum ReasonRole { kReasonSerialRole = Qt::UserRole, kReasonKeyRole };
 
 }  // namespace
 
@@ -43,8 +43,8 @@ WhyDialog::WhyDialog(const QString& title, const std::vector<Explanation>& expla
       auto* row = new QTreeWidgetItem(subject, {Translated(reason.text), Translated(reason.page)});
       row->setIcon(0, theme.Icon(reason.holds ? "ok" : "note"));
       row->setToolTip(0, row->text(0));
-      row->setData(0, kSerialRole, QVariant::fromValue<quint64>(reason.serial));
-      row->setData(0, kKeyRole, ToQt(reason.key));
+      row->setData(0, kReasonSerialRole, QVariant::fromValue<quint64>(reason.serial));
+      row->setData(0, kReasonKeyRole, ToQt(reason.key));
     }
     subject->setExpanded(true);
   }
@@ -52,8 +52,9 @@ WhyDialog::WhyDialog(const QString& title, const std::vector<Explanation>& expla
   auto* buttons = new QDialogButtonBox(QDialogButtonBox::Close);
   QPushButton* show = buttons->addButton(tr("&Show on Its Page"), QDialogButtonBox::ActionRole);
   show->setEnabled(false);
-  connect(list_, &QTreeWidget::currentItemChanged, this,
-          [show](QTreeWidgetItem* item) { show->setEnabled(item && item->data(0, kSerialRole).toULongLong() != 0); });
+  connect(list_, &QTreeWidget::currentItemChanged, this, [show](QTreeWidgetItem* item) {
+    show->setEnabled(item && item->data(0, kReasonSerialRole).toULongLong() != 0);
+  });
   connect(show, &QPushButton::clicked, this, &WhyDialog::Choose);
   connect(buttons, &QDialogButtonBox::rejected, this, &QDialog::reject);
   auto* all = new QVBoxLayout(this);
@@ -65,10 +66,10 @@ WhyDialog::WhyDialog(const QString& title, const std::vector<Explanation>& expla
 
 void WhyDialog::Choose() {
   const QTreeWidgetItem* item = list_->currentItem();
-  const quint64 serial = item ? item->data(0, kSerialRole).toULongLong() : 0;
+  const quint64 serial = item ? item->data(0, kReasonSerialRole).toULongLong() : 0;
   if (serial == 0) return;
   accept();
-  emit Chosen(serial, item->data(0, kKeyRole).toString());
+  emit Chosen(serial, item->data(0, kReasonKeyRole).toString());
 }
 
 }  // namespace tervane

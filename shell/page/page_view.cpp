@@ -133,7 +133,9 @@ void PageView::Build(const QString& placeText, const QString& path) {
   findings_->setWordWrap(true);
   findings_->setTextFormat(Qt::RichText);
   findings_->setContentsMargins(margin, theme.Scaled(6), margin, theme.Scaled(6));
+  findings_->setTextInteractionFlags(Qt::LinksAccessibleByMouse | Qt::LinksAccessibleByKeyboard);
   findings_->hide();
+  connect(findings_, &QLabel::linkActivated, this, &PageView::FollowFixLink);
   all->addWidget(findings_);
   AlignLabels();
   Sync();
@@ -394,20 +396,25 @@ void PageView::SyncFindings() {
   const Theme& theme = Theme::Get();
   QString lines;
   int count = 0;
-  const auto add = [&](const Finding& finding) {
+  linked_.clear();
+  const auto add = [&](CYbSEKvfBase& node, const Finding& finding) {
     if (++count > kMostFindings) return;
     const QColor color = finding.severity == Severity::Error     ? theme.ErrorColor()
                          : finding.severity == Severity::Warning ? theme.WarningColor()
                                                                  : theme.QuietColor();
     QString text = Translated(finding.text).toHtmlEscaped().replace("\n", "<br>");
     if (!finding.detail.empty()) text += " — " + ToQt(finding.detail).toHtmlEscaped();
+    if (const QString fix = fixOf_ ? fixOf_(node, finding) : QString(); !fix.isEmpty()) {
+      text += QString("&nbsp; <a href='%1'>%2</a>").arg(linked_.size()).arg(fix.toHtmlEscaped());
+      linked_.emplace_back(node.Serial(), finding);
+    }
     lines += QString("<div><b style='color:%1'>%2</b>&nbsp; %3</div>")
                  .arg(color.name(), SeverityText(finding.severity), text);
   };
-  const std::function<void(const CYbSEKvfBase&)> addAll = [&](const CYbSEKvfBase& node) {
-    for (const Finding& finding : node.Findings()) add(finding);
+  const std::function<void(CYbSEKvfBase&)> addAll = [&](CYbSEKvfBase& node) {
+    for (const Finding& finding : node.Findings()) add(node, finding);
     // What has no page of its own, such as a file, speaks here.
-    for (const CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
+    for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
       if (!PageClassOf(*child)) addAll(*child);
   };
   // A dialog asks for something of its own.
@@ -415,6 +422,19 @@ void PageView::SyncFindings() {
   if (count > kMostFindings) lines += "<div>" + tr("and %n more", nullptr, count - kMostFindings) + "</div>";
   findings_->setText(lines);
   findings_->setVisible(count > 0);
+}
+
+void PageView::OfferFixes(FixOf fixOf) {
+  fixOf_ = std::move(fixOf);
+  SyncFindings();
+}
+
+void PageView::FollowFixLink(const QString& link) {
+  const std::size_t number = link.toULong();
+  if (number >= linked_.size()) return;
+  // A copy: what is fixed is found no more.
+  const auto [serial, finding] = linked_[number];
+  emit FixAsked(serial, finding);
 }
 
 void PageView::Commit() {

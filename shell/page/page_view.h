@@ -4,6 +4,7 @@
 
 #include <QFrame>
 #include <QWidget>
+#include <functional>
 #include <memory>
 #include <vector>
 
@@ -45,6 +46,9 @@ class PageView : public QWidget {
   std::string NameOf(const void* control) const;
   /// Puts the keyboard on the control of that name and lets it stand out for a moment.
   void PointOut(const std::string& name);
+  /// What fixes a finding, as a link behind it; empty where nothing does.
+  using FixOf = std::function<QString(CYbSEKvfBase& node, const Finding& finding)>;
+  void OfferFixes(FixOf fixOf);
   /// Texts that were not taken give way to what the node holds.
   void DropRefused();
 
@@ -52,6 +56,8 @@ class PageView : public QWidget {
   void UnitChosen(int itemType, int unit);
   /// The user asks why a control cannot be changed.
   void WhyAsked(const Control* control);
+  /// The user has followed the link behind a finding.
+  void FixAsked(quint64 serial, const Finding& finding);
 
  protected:
   void resizeEvent(QResizeEvent* event) override;
@@ -74,6 +80,7 @@ class PageView : public QWidget {
   void SyncStretch();
   void AlignLabels();
   void SyncFindings();
+  void FollowFixLink(const QString& link);
   /// The control of a key, a label or a name of `NameOf`; one that is shown if there is one. Null when there is none.
   ControlWidget* Find(const std::string& name) const;
   void PointOut(ControlWidget* widget);
@@ -105,6 +112,9 @@ class PageView : public QWidget {
   int neededByForm_ = 0;  ///< The least width in which nothing of it is cut.
   QBoxLayout* content_ = nullptr;
   QLabel* findings_;
+  FixOf fixOf_;
+  /// What the links behind findings stand for, by their numbers; nodes by serial, since they may go.
+  std::vector<std::pair<std::uint64_t, Finding>> linked_;
   QScrollArea* scroll_;
   int widest_ = 0;  ///< What a row of groups would like to have.
 };

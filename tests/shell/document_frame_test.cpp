@@ -4,6 +4,8 @@
 
 #include <QCheckBox>
 #include <QDialog>
+#include <QDir>
+#include <QFile>
 #include <QMenu>
 #include <QPlainTextEdit>
 #include <QScrollArea>
@@ -69,6 +71,50 @@ TEST(DocumentFrame, AFindingOffersWhatMendsItAsOneStep) {
   EXPECT_EQ(findings->Count(), before - 1);
   setup.Command("Undo Change Species to Species_1");
   EXPECT_EQ(findings->Count(), before);
+}
+
+QAction* ActionOf(const QMenu& menu, const QString& text) {
+  for (QAction* action : menu.actions())
+    if (QString(action->text()).remove('&') == text) return action;
+  ADD_FAILURE() << "no command " << FromQt(text);
+  return nullptr;
+}
+
+TEST(DocumentFrame, MovedFilesAreFoundTogetherAsOneStep) {
+  OpenedSetup setup(test::Example{"rhone", "rhone.tvd"});
+  const QString folder = ToQt(setup.Frame().Session().Document().Root().SetupFolder());
+  ASSERT_TRUE(QDir(folder).mkdir("moved"));
+  for (const char* name : {"manning.nds2", "precipitation_gauges.nds0"})
+    ASSERT_TRUE(QFile::rename(folder + "/" + name, folder + "/moved/" + name));
+  setup.Frame().Session().UpdateDoc(setup.Frame().Session().Document().Root(), kDataChanged, "Look Again");
+  auto* findings = setup.Frame().findChild<FindingsView*>();
+  const auto lines = findings->findItems("File is not valid", Qt::MatchContains, 2);
+  ASSERT_EQ(lines.size(), 2);
+  QMenu menu;
+  findings->FillMenu(menu, lines.front());
+  EXPECT_TRUE(ActionOf(menu, "Find the File by Its Name at 50 Places"));
+  test::NextAnswer answer("Change");
+  ActionOf(menu, "Fix All 51 of This Kind")->trigger();
+  EXPECT_EQ(answer.Text(), "Change 51 values?");
+  EXPECT_EQ(setup.Value("Overland/Manning/NDS_2D_DATA_FILE:FILE_NAME"), "moved/manning.nds2");
+  EXPECT_TRUE(findings->findItems("File is not valid", Qt::MatchContains, 2).isEmpty());
+  setup.Command("Undo Find the File by Its Name");
+  EXPECT_EQ(setup.Value("Overland/Manning/NDS_2D_DATA_FILE:FILE_NAME"), "manning.nds2");
+  EXPECT_EQ(findings->findItems("File is not valid", Qt::MatchContains, 2).size(), 2);
+}
+
+TEST(DocumentFrame, AFindingAtTheFootOfAPageHasItsFixBehindIt) {
+  OpenedSetup setup(kWaterQualityTooEarly);
+  setup.GoTo("ModelCompWQ/SimulationPeriodWQ");
+  QLabel* foot = nullptr;
+  for (QLabel* label : setup.Frame().findChildren<QLabel*>())
+    if (label->text().contains("Set the Date Within the Simulation of Flow")) foot = label;
+  ASSERT_TRUE(foot);
+  emit foot->linkActivated("0");
+  EXPECT_EQ(setup.Value("ModelCompWQ/SimulationPeriodWQ:SimStart"), "2000, 1, 1, 0, 0");
+  EXPECT_FALSE(foot->isVisible());
+  setup.Command("Undo Set the Date Within the Simulation of Flow");
+  EXPECT_NE(setup.Value("ModelCompWQ/SimulationPeriodWQ:SimStart"), "2000, 1, 1, 0, 0");
 }
 
 TEST(DocumentFrame, ANodeThatLeavesTheSetupGivesItsPlaceToTheNearestAbove) {
