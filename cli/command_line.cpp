@@ -53,6 +53,7 @@ constexpr CommandFile kFiles[] = {
     {OfferDiffCommand, {"diff"}},
     {OfferClimateCommand},
     {OfferKeysCommand},
+    {OfferReportCommand, {"report"}},
     {OfferRunCommand, {"run"}},
     {OfferDataCommands},
     {OfferImports},

@@ -54,6 +54,7 @@ void OfferValueCommands(CommandOffers& offers);
 void OfferDiffCommand(CommandOffers& offers);
 void OfferClimateCommand(CommandOffers& offers);
 void OfferKeysCommand(CommandOffers& offers);
+void OfferReportCommand(CommandOffers& offers);
 void OfferRunCommand(CommandOffers& offers);
 void OfferDataCommands(CommandOffers& offers);
 /// Below the family `import`.

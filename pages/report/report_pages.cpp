@@ -1,0 +1,205 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <algorithm>
+#include <map>
+
+#include <fmt/format.h>
+
+#include "document/key_reference.h"
+#include "forms/page.h"
+#include "forms/table_form.h"
+#include "geometry/cart.h"
+#include "pages/key_defaults.h"
+#include "pages/parts/plot_content.h"
+#include "pages/place_names.h"
+#include "pages/report/report.h"
+#include "pages/report/report_pictures.h"
+#include "pages/tree_entries.h"
+#include "platform/text.h"
+#include "spatial/domain.h"
+
+namespace tervane {
+
+namespace {
+
+constexpr int kMostRows = 60;  ///< Of a table of a page.
+constexpr int kMostAlike = 2;  ///< Pages of one kind, such as those of stations, whose plots are shown.
+
+/// "Initial time step: 6" of a control, where it shows a value that people read.
+std::optional<std::string> ValueInWords(const Control& control) {
+  switch (control.kind) {
+    case ControlKind::Check:
+      return control.Text() == "1" ? "on" : "off";
+    case ControlKind::Radio:
+    case ControlKind::Choice: {
+      const std::vector<std::string> options = control.Options();
+      const int chosen = control.Option();
+      if (options.empty()) return std::nullopt;
+      return chosen >= 0 ? SpokenLabel(options[static_cast<std::size_t>(chosen)])
+                         : control.Text() + " (not in the list)";
+    }
+    case ControlKind::Text:
+    case ControlKind::LongText:
+    case ControlKind::Integer:
+    case ControlKind::Number:
+    case ControlKind::Date:
+    case ControlKind::File: {
+      const std::string unit = control.UnitText(), value = Replaced(control.Text(), "\n", " ");
+      return unit.empty() || value.empty() ? value : fmt::format("{} {}", value, unit);
+    }
+    default:
+      return std::nullopt;
+  }
+}
+
+/// The default as the tool tip of the control tells it.
+std::string DefaultInWords(KeyDefaults& defaults, const Control& control) {
+  constexpr std::string_view kHead = "Default: ";
+  const std::string tip = defaults.ToolTip(control);
+  std::size_t begin = tip.starts_with(kHead) ? 0 : tip.find(std::string("\n") + std::string(kHead));
+  if (begin == std::string::npos) return {};
+  begin += kHead.size() + (tip[begin] == '\n' ? 1 : 0);
+  return tip.substr(begin, tip.find('\n', begin) - begin);
+}
+
+/// What one page shows otherwise than a new setup.
+class PageDifferences {
+ public:
+  PageDifferences(KeyDefaults& defaults, const ReportDates& dates) : defaults_(defaults), dates_(dates) {}
+
+  void Add(PageForm& form, const std::string& group = {}) {
+    std::string before;
+    for (const auto& control : form.Controls()) {
+      if (!control->IsShown()) continue;
+      if (control->group) Add(*control->group, SpokenLabel(control->label));
+      if (control->table && !control->table->IsShownOnly()) AddTable(*control->table);
+      if (control->kind == ControlKind::SubForms) {
+        const int current = control->currentSubForm();
+        if (current >= 0 && current < static_cast<int>(control->subForms.size()))
+          Add(*control->subForms[static_cast<std::size_t>(current)], group);
+      }
+      std::string label = NameOf(*control);
+      if (label.empty() && control->beside) label = before;
+      before = label;
+      AddValue(*control, group.empty() ? label : label.empty() ? group : fmt::format("{}, {}", group, label));
+    }
+  }
+  ReportTable values{{"Value", "Here", "Default"}, {}};
+  std::vector<ReportTable> tables;
+
+ private:
+  void AddValue(const Control& control, const std::string& label) {
+    // What is disabled is used by nobody.
+    if (!control.IsEnabled() || !control.isOfKey) return;
+    const std::optional<std::string> value = ValueInWords(control);
+    if (!value || value->empty()) return;
+    // A text or a file has no default to go back to: what is filled in is told.
+    const bool isFilled =
+        control.kind == ControlKind::Text || control.kind == ControlKind::LongText || control.kind == ControlKind::File;
+    if (!isFilled && !defaults_.Reset(control)) return;
+    values.rows.push_back({label, dates_.In(*value), isFilled ? "" : dates_.In(DefaultInWords(defaults_, control))});
+  }
+  void AddTable(const TableForm& table) {
+    ReportTable told;
+    std::vector<int> columns;
+    for (int column = 1; column <= table.ColumnCount(); ++column)
+      if (!table.Column(column)->IsButton()) columns.push_back(column);
+    for (const int column : columns) told.heads.push_back(Replaced(table.Head(column), "\n", " "));
+    for (int row = 1; row <= std::min(table.RowCount(), kMostRows); ++row) {
+      auto& cells = told.rows.emplace_back();
+      for (const int column : columns) cells.push_back(dates_.In(table.ShownCell(row, column)));
+    }
+    if (table.RowCount() > kMostRows) told.rows.push_back({fmt::format("and {} more", table.RowCount() - kMostRows)});
+    if (!told.rows.empty() && !told.heads.empty()) tables.push_back(std::move(told));
+  }
+
+  KeyDefaults& defaults_;
+  const ReportDates& dates_;
+};
+
+std::string PlaceOfPage(CYbSEKvfBase& node) {
+  std::string place;
+  for (const std::string& title : PlaceNames::TitlesTo(node)) place += (place.empty() ? "" : " > ") + title;
+  return place;
+}
+
+}  // namespace
+
+void ReportValues(ReportContext& context, std::vector<ReportBlock>& blocks) {
+  NobodyToAsk host;
+  const std::vector<TreeEntry> entries = TreeEntries(context.document.Root(), kSetupDataTree);
+  for (std::size_t place = 1; place < entries.size(); ++place) {
+    const TreeEntry& entry = entries[place];
+    const auto page = MakePageToRead(*entry.page, *entry.node, {context.document, host, {}});
+    if (!page) continue;
+    KeyDefaults defaults;
+    PageDifferences differences(defaults, context.dates);
+    differences.Add(page->Form());
+    if (differences.values.rows.empty() && differences.tables.empty()) continue;
+    blocks.push_back(ReportHeading{PlaceOfPage(*entry.node)});
+    if (!differences.values.rows.empty()) blocks.push_back(std::move(differences.values));
+    for (ReportTable& table : differences.tables) blocks.push_back(std::move(table));
+  }
+  if (blocks.empty()) blocks.push_back(ReportText{"All values are those of a new setup."});
+}
+
+void ReportDomain(ReportContext& context, std::vector<ReportBlock>& blocks) {
+  auto* domain = context.document.Root().Important(kDomain);
+  if (!domain || !domain->HasGeometry()) {
+    blocks.push_back(ReportText{"No file that can be read tells yet where the model lies."});
+    return;
+  }
+  const GridGeometry grid = domain->GetModelGeometry();
+  const std::string projection = CYbMapProjection(grid.projection).Name();
+  ReportTable table;
+  table.rows = {{"Grid", fmt::format("{} columns, {} rows", grid.nx, grid.ny)},
+                {"Cell size", fmt::format("{} m", ShortestNumber(grid.cellSize))},
+                {"Lower left corner", fmt::format("{}, {}", ShortestNumber(grid.x0), ShortestNumber(grid.y0))}};
+  if (grid.rotation != 0.0) table.rows.push_back({"Rotation", fmt::format("{}°", ShortestNumber(grid.rotation))});
+  if (!projection.empty()) table.rows.push_back({"Projection", projection});
+  const std::function<MapContent()> content = [domain] {
+    return domain->Type == CCatchmentKvf::kGridFile ? FileMap(domain->GridFile())
+                                                    : ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
+  };
+  blocks.push_back(std::move(table));
+  if (auto picture = DrawMap(Finished(content))) {
+    picture->caption = "The model domain";
+    blocks.push_back(std::move(*picture));
+  }
+}
+
+void ReportInputs(ReportContext& context, std::vector<ReportBlock>& blocks) {
+  NobodyToAsk host;
+  const std::vector<TreeEntry> entries = TreeEntries(context.document.Root(), kSetupDataTree);
+  std::map<std::string, int> alike;
+  const CYbSEKvfBase* domain = context.document.Root().Important(kDomain);
+  for (std::size_t place = 1; place < entries.size(); ++place) {
+    const TreeEntry& entry = entries[place];
+    const std::string kind = NumberlessPath(entry.path);
+    // The domain has a section of its own.
+    if (entry.node == domain || (kind != entry.path && alike[kind] >= kMostAlike)) continue;
+    const auto page = MakePageToRead(*entry.page, *entry.node, {context.document, host, {}});
+    if (!page) continue;
+    std::vector<ReportPicture> pictures;
+    page->Form().ForEach([&](Control& control) {
+      if (!control.IsShown()) return;
+      std::optional<ReportPicture> picture;
+      if (control.kind == ControlKind::Map && control.map) picture = DrawMap(Finished(control.map));
+      if (control.kind == ControlKind::Chart && control.chart) picture = DrawChart(Finished(control.chart));
+      if (!picture) return;
+      picture->caption = SpokenLabel(control.label);
+      pictures.push_back(std::move(*picture));
+    });
+    if (pictures.empty()) continue;
+    const int number = ++alike[kind];
+    blocks.push_back(ReportHeading{PlaceOfPage(*entry.node)});
+    for (ReportPicture& picture : pictures) blocks.push_back(std::move(picture));
+    if (kind == entry.path || number < kMostAlike) continue;
+    const auto more =
+        std::ranges::count_if(entries, [&](const TreeEntry& other) { return NumberlessPath(other.path) == kind; }) -
+        kMostAlike;
+    if (more > 0) blocks.push_back(ReportText{fmt::format("{} more of this kind are not shown.", more), true});
+  }
+}
+
+}  // namespace tervane
