@@ -27,6 +27,7 @@
 #include "shell/program.h"
 #include "shell/relief/relief_canvas.h"
 #include "shell/relief/relief_window.h"
+#include "shell/report_pdf.h"
 #include "shell/widgets/plot_frame.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -37,7 +38,8 @@ using namespace tervane;
 
 struct Typed {
   std::vector<std::string> files;
-  std::string page, size, screenshot, appearance, dialog, relief;
+  std::string page, size, screenshot, appearance, dialog, relief, report;
+  ReportOptions reported;
   std::vector<std::string> answers;
   double zoom = 0;
   int delay = -1, slice = 0;
@@ -133,6 +135,18 @@ class Application : public QApplication {
   }
 };
 
+/// Draws the report of a setup for paper, without a window.
+int DrawReport(const Typed& typed) {
+  CFlowModelDoc document;
+  if (typed.files.size() != 1 || !document.OnOpenDocument(typed.files.front())) {
+    std::fprintf(stderr, "%s\n", typed.files.size() != 1 ? "--report goes with one setup" : document.Error().c_str());
+    return 2;
+  }
+  const FileResult written = WriteReportPdf(typed.report, MakeReport(document, typed.reported));
+  if (!written.Ok()) std::fprintf(stderr, "%s\n", written.error.c_str());
+  return written.Ok() ? 0 : 2;
+}
+
 int Run(const Typed& typed, QApplication& application) {
   // A picture shows the program as it is for everybody, and leaves nothing in the user's settings.
   const bool isPicture = !typed.screenshot.empty();
@@ -217,9 +231,22 @@ int main(int argc, char** argv) {
   commandLine
       .add_option("--delay", typed.delay, "Draw it after so many milliseconds, whatever is still being computed")
       ->check(CLI::NonNegativeNumber);
+  commandLine.add_option("--report", typed.report, "Write the report of the setup as this PDF and end");
+  commandLine.add_option("--report-logo", typed.reported.logo, "A picture at the head of the report");
+  const auto takenBy = [&typed](std::string (*take)(std::string_view, ReportOptions&)) {
+    return [&typed, take](const CLI::results_t& words) {
+      const std::string why = take(words.front(), typed.reported);
+      if (!why.empty()) throw CLI::ValidationError(why);
+      return true;
+    };
+  };
+  commandLine.add_option("--report-sections", takenBy(TakeReportSections), "Some of its sections alone");
+  commandLine.add_option("--report-dates", takenBy(TakeReportDates), "How it writes dates: iso, en, de or fr");
   commandLine.set_version_flag("--version", std::string("quarzel ") + kProgramVersion);
   CLI11_PARSE(commandLine, argc, argv);
 
+  // A report needs no display.
+  if (!typed.report.empty() && !qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
   Application application(argc, argv);
   QApplication::setApplicationName("Quarzel");
   QApplication::setApplicationVersion(kProgramVersion);
@@ -227,7 +254,7 @@ int main(int argc, char** argv) {
   if (translator.load(QLocale(), "quarzel", "_", QApplication::applicationDirPath() + "/translations"))
     QApplication::installTranslator(&translator);
   try {
-    return Run(typed, application);
+    return typed.report.empty() ? Run(typed, application) : DrawReport(typed);
   } catch (const std::bad_alloc&) {
     std::fprintf(stderr, "quarzel: there is not enough memory for this\n");
     return 2;

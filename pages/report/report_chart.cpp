@@ -169,7 +169,7 @@ class ChartDrawing {
       svg_ += fmt::format("<text x=\"{}\" y=\"{:.1f}\" text-anchor=\"{}\">{}</text>\n", x, y + 4, anchor,
                           axis.Text(border));
     }
-    if (!axis.unit.empty())
+    if (!axis.unit.empty() && axis.unit != "-")
       svg_ += fmt::format("<text x=\"{}\" y=\"{:.1f}\" text-anchor=\"{}\" fill=\"#505050\">{}</text>\n", x, top - 6,
                           anchor, XmlText(axis.unit));
   }

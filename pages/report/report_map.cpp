@@ -19,7 +19,8 @@ constexpr double kMapWidth = 470, kMapHeight = 440, kLegendWidth = 190;
 constexpr int kMostPixels = 700;         ///< Of an image along a side.
 constexpr std::size_t kMostLegend = 16;  ///< Rows of a layer.
 constexpr std::size_t kMostLabels = 25;  ///< Points that bear their names.
-constexpr unsigned kOutline = 0x404040, kDomainLine = 0xb03030, kWater = 0x2060b0;
+constexpr unsigned kHighlight = 0xef8636, kOthers = 0xe4e4e4, kOutline = 0x404040, kDomainLine = 0xb03030,
+                   kWater = 0x2060b0;
 
 struct LegendRow {
   unsigned color;
@@ -64,7 +65,9 @@ class LayerColors {
  public:
   explicit LayerColors(const GridLayer& layer) : layer_(layer) {
     legend_.title = TitleOf(*layer.grid);
-    if (!layer.classes.empty())
+    if (layer.highlighted.code)
+      MakeHighlighted(*layer.highlighted.code);
+    else if (!layer.classes.empty())
       MakeOwn();
     else if (layer.isCodes)
       MakeCodes();
@@ -75,7 +78,7 @@ class LayerColors {
     if (layer_.grid->IsEmptyValue(value)) return 0;
     if (!byValue_.empty()) {
       const auto found = byValue_.find(layer_.classes.empty() ? std::round(value) : value);
-      return found == byValue_.end() ? 0 : found->second;
+      return found == byValue_.end() ? numberOfOthers_ : found->second;
     }
     if (borders_.size() < 2) return 1;
     const auto above = std::upper_bound(borders_.begin() + 1, borders_.end() - 1, static_cast<double>(value));
@@ -88,6 +91,12 @@ class LayerColors {
   void Add(unsigned color, std::string text) {
     colors_.push_back(color);
     if (legend_.rows.size() < kMostLegend) legend_.rows.push_back({color, std::move(text)});
+  }
+  void MakeHighlighted(float code) {
+    byValue_[code] = 1;
+    numberOfOthers_ = 2;
+    colors_.insert(colors_.end(), {kHighlight, kOthers});
+    legend_.title.clear();
   }
   void MakeOwn() {
     for (const CellClass& each : layer_.classes) {
@@ -113,7 +122,7 @@ class LayerColors {
     float largest = 0, smallest = 0;
     if (!layer_.grid->GetMaxMin(largest, smallest)) return;
     if (layer_.range) smallest = layer_.range->first, largest = layer_.range->second;
-    borders_ = NiceBorders(static_cast<double>(smallest), static_cast<double>(largest));
+    borders_ = NiceBorders(static_cast<double>(smallest), static_cast<double>(largest), 10);
     const bool isGround = layer_.ramp == Ramp::Terrain ||
                           (layer_.ramp == Ramp::OfQuantity && layer_.grid->ItemType() == quantity::kElevation);
     if (borders_.size() < 2) return Add(RampAt(0.5, isGround), ShortestNumber(smallest));
@@ -130,6 +139,7 @@ class LayerColors {
   std::vector<unsigned> colors_{0xffffff};
   std::vector<double> borders_;
   std::map<float, std::uint8_t> byValue_;
+  std::uint8_t numberOfOthers_ = 0;
   Legend legend_;
 };
 
@@ -158,11 +168,11 @@ class MapDrawing {
                    south = Place(transform.ToWorld({0, 0}));
     svg_ += fmt::format(
         "<image width=\"{}\" height=\"{}\" preserveAspectRatio=\"none\" "
-        "transform=\"matrix({:.6f} {:.6f} {:.6f} {:.6f} {:.3f} {:.3f})\" opacity=\"{:.2f}\" "
+        "transform=\"matrix({:.6f} {:.6f} {:.6f} {:.6f} {:.3f} {:.3f})\" "
         "style=\"image-rendering:pixelated\" xlink:href=\"data:image/png;base64,{}\"/>\n",
         image.width, image.height, (east.x - corner.x) / image.width, (east.y - corner.y) / image.width,
         (south.x - corner.x) / image.height, (south.y - corner.y) / image.height, corner.x, corner.y,
-        1 - layer.transparency, Base64(PngOf(image)));
+        Base64(PngOf(image)));
     if (layer.withLegend) AddLegend(colors.Rows());
   }
 
@@ -172,7 +182,9 @@ class MapDrawing {
     const bool areFilled = layer.isFilled && layer.shapes->Kind() == ShapeKind::Polygon;
     std::map<std::string, unsigned> fills;
     Legend legend;
+    std::size_t place = 0;
     for (const Shape& shape : layer.shapes->GetData()) {
+      const bool isHighlighted = layer.highlighted.IsOfShape(place++, shape);
       if (arePoints) {
         for (const MapPoint& point : shape.points) AddDot(point, kOutline);
         continue;
@@ -186,6 +198,7 @@ class MapDrawing {
         if (isNew && legend.rows.size() < kMostLegend)
           legend.rows.push_back({known->second, name != layer.names.end() ? name->second : value});
       }
+      if (isHighlighted && layer.shapes->Kind() == ShapeKind::Polygon) fill = SvgColor(kHighlight);
       std::string path;
       for (std::size_t part = 0; part < shape.parts.size(); ++part)
         AddPath(path, std::span(shape.points).subspan(shape.parts[part], shape.PartEnd(part) - shape.parts[part]),

@@ -97,7 +97,8 @@ class PageDifferences {
     const bool isFilled =
         control.kind == ControlKind::Text || control.kind == ControlKind::LongText || control.kind == ControlKind::File;
     if (!isFilled && !defaults_.Reset(control)) return;
-    values.rows.push_back({label, dates_.In(*value), isFilled ? "" : dates_.In(DefaultInWords(defaults_, control))});
+    values.rows.push_back({label.empty() ? "Choice" : label, dates_.In(*value),
+                           isFilled ? "" : dates_.In(DefaultInWords(defaults_, control))});
   }
   void AddTable(const TableForm& table) {
     ReportTable told;
@@ -117,6 +118,36 @@ class PageDifferences {
   const ReportDates& dates_;
 };
 
+/// A page with what it shows otherwise than a new setup.
+struct ChangedPage {
+  std::string kind, place, name;
+  ReportTable values;
+  std::vector<ReportTable> tables;
+
+  /// Whether both fill in the same fields, so that they can be rows of one table.
+  bool IsLike(const ChangedPage& other) const {
+    return kind == other.kind && tables.empty() && other.tables.empty() &&
+           std::ranges::equal(values.rows, other.values.rows,
+                              [](const auto& a, const auto& b) { return a.front() == b.front(); });
+  }
+};
+
+/// Several pages that are alike, a row each.
+void AddAlike(std::span<const ChangedPage> pages, std::vector<ReportBlock>& blocks) {
+  ReportTable table{{"Page"}, {}};
+  for (const auto& value : pages.front().values.rows) table.heads.push_back(value.front());
+  for (const ChangedPage& page : pages) {
+    auto& row = table.rows.emplace_back(std::vector<std::string>{page.name});
+    for (const auto& value : page.values.rows) row.push_back(value[1]);
+  }
+  const std::string place = pages.front().place.substr(0, pages.front().place.rfind(" > "));
+  blocks.push_back(ReportHeading{fmt::format("{}: {} pages", place, pages.size())});
+  blocks.push_back(std::move(table));
+}
+
+/// Settings of maps say nothing of the model.
+bool IsOfModel(const TreeEntry& entry) { return !entry.path.starts_with("Overlays"); }
+
 std::string PlaceOfPage(CYbSEKvfBase& node) {
   std::string place;
   for (const std::string& title : PlaceNames::TitlesTo(node)) place += (place.empty() ? "" : " > ") + title;
@@ -128,17 +159,31 @@ std::string PlaceOfPage(CYbSEKvfBase& node) {
 void ReportValues(ReportContext& context, std::vector<ReportBlock>& blocks) {
   NobodyToAsk host;
   const std::vector<TreeEntry> entries = TreeEntries(context.document.Root(), kSetupDataTree);
+  std::vector<ChangedPage> pages;
   for (std::size_t place = 1; place < entries.size(); ++place) {
     const TreeEntry& entry = entries[place];
+    if (!IsOfModel(entry)) continue;
     const auto page = MakePageToRead(*entry.page, *entry.node, {context.document, host, {}});
     if (!page) continue;
     KeyDefaults defaults;
     PageDifferences differences(defaults, context.dates);
     differences.Add(page->Form());
     if (differences.values.rows.empty() && differences.tables.empty()) continue;
-    blocks.push_back(ReportHeading{PlaceOfPage(*entry.node)});
-    if (!differences.values.rows.empty()) blocks.push_back(std::move(differences.values));
-    for (ReportTable& table : differences.tables) blocks.push_back(std::move(table));
+    pages.push_back({NumberlessPath(entry.path), PlaceOfPage(*entry.node), entry.title, std::move(differences.values),
+                     std::move(differences.tables)});
+  }
+  constexpr std::ptrdiff_t kFewest = 3;
+  for (auto page = pages.begin(); page != pages.end();) {
+    const auto end = std::find_if_not(page, pages.end(), [&](const ChangedPage& other) { return other.IsLike(*page); });
+    if (end - page >= kFewest) {
+      AddAlike({page, end}, blocks);
+      page = end;
+      continue;
+    }
+    blocks.push_back(ReportHeading{page->place});
+    if (!page->values.rows.empty()) blocks.push_back(std::move(page->values));
+    for (ReportTable& table : page->tables) blocks.push_back(std::move(table));
+    ++page;
   }
   if (blocks.empty()) blocks.push_back(ReportText{"All values are those of a new setup."});
 }
@@ -158,8 +203,11 @@ void ReportDomain(ReportContext& context, std::vector<ReportBlock>& blocks) {
   if (grid.rotation != 0.0) table.rows.push_back({"Rotation", fmt::format("{}°", ShortestNumber(grid.rotation))});
   if (!projection.empty()) table.rows.push_back({"Projection", projection});
   const std::function<MapContent()> content = [domain] {
-    return domain->Type == CCatchmentKvf::kGridFile ? FileMap(domain->GridFile())
-                                                    : ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
+    MapContent map = domain->Type == CCatchmentKvf::kGridFile
+                         ? FileMap(domain->GridFile())
+                         : ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
+    for (ShapeLayer& shapes : map.shapes) shapes.isDomain = true;
+    return map;
   };
   blocks.push_back(std::move(table));
   if (auto picture = DrawMap(Finished(content))) {
@@ -177,7 +225,7 @@ void ReportInputs(ReportContext& context, std::vector<ReportBlock>& blocks) {
     const TreeEntry& entry = entries[place];
     const std::string kind = NumberlessPath(entry.path);
     // The domain has a section of its own.
-    if (entry.node == domain || (kind != entry.path && alike[kind] >= kMostAlike)) continue;
+    if (!IsOfModel(entry) || entry.node == domain || (kind != entry.path && alike[kind] >= kMostAlike)) continue;
     const auto page = MakePageToRead(*entry.page, *entry.node, {context.document, host, {}});
     if (!page) continue;
     std::vector<ReportPicture> pictures;

@@ -97,7 +97,8 @@ TEST(Report, DatesAreWrittenInTheStyleOfTheReaderButForThoseOfNames) {
 
 TEST(Report, ScalesHaveBordersThatPeopleLike) {
   EXPECT_EQ(NiceBorders(372, 4200).front(), 0);
-  EXPECT_EQ(NiceBorders(0.013, 0.019, 5), (std::vector<double>{0.012, 0.014, 0.016, 0.018, 0.02}));
+  EXPECT_THAT(NiceBorders(0.013, 0.019, 5),
+              testing::Pointwise(testing::DoubleNear(1e-12), {0.012, 0.014, 0.016, 0.018, 0.02}));
   EXPECT_EQ(NiceBorders(3, 3), std::vector<double>{3});
   EXPECT_EQ(NumberAt(0.30000000000000004, 0.1), "0.3");
   EXPECT_EQ(NumberAt(-0.0001, 1), "0");
