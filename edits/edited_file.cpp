@@ -63,10 +63,11 @@ void EditedFile::AskRights() {
 
 FileResult EditedFile::Save(const std::string& path, ProgressPart progress) {
   const bool isInPlace = IsSameFile(path, path_) || path == path_;
-  if (isInPlace && !whyReadOnly_.empty())
-    return {fmt::format("cannot write {}: {}; save it under another name", path, whyReadOnly_), {}};
+  if (isInPlace && !WhyReadOnly().empty())
+    return {fmt::format("cannot write {}: {}; save it under another name", path, WhyReadOnly()), {}};
   FileResult result = Write(path, progress);
   if (!result.Ok()) return result;
+  if (!isInPlace) whyHeld_.clear();
   path_ = isInPlace ? path_ : path;
   AskRights();
   known_.Remember(path_);

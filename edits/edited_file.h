@@ -55,7 +55,9 @@ class EditedFile {
   const std::string& Problem() const { return problem_; }
   /// Why nothing can be saved in its place ("you may not write to the file"); empty when it can. Under another name it
   /// can.
-  const std::string& WhyReadOnly() const { return whyReadOnly_; }
+  const std::string& WhyReadOnly() const { return whyHeld_.empty() ? whyReadOnly_ : whyHeld_; }
+  /// Somebody else has it open; nobody with an empty text.
+  void SetHeld(std::string why) { whyHeld_ = std::move(why); }
 
   /// Reads the file again and forgets all changes. "" or why not; what cannot be read takes nothing away.
   std::string Reload();
@@ -102,7 +104,7 @@ class EditedFile {
   std::string Go(std::vector<NamedStep>& from, std::vector<NamedStep>& to);
   void AskRights();
 
-  std::string path_, problem_, whyReadOnly_;
+  std::string path_, problem_, whyReadOnly_, whyHeld_;
   KnownFile known_;
   std::vector<NamedStep> done_, undone_;
   std::size_t saved_ = 0;     ///< How many steps were done when the file was saved.

@@ -39,6 +39,15 @@ void EditTab::SetBody(QWidget* body) {
   ShowReadOnly();
 }
 
+void EditTab::HoldFile() {
+  isHolding_ = true;
+  lock_.Release();
+  if (!File().Problem().empty()) return;
+  const bool isTaken = lock_.Take(Path()) == SetupLock::Outcome::Taken;
+  File().SetHeld(isTaken ? std::string() : lock_.Reason());
+  ShowReadOnly();
+}
+
 void EditTab::ShowReadOnly() {
   if (readOnlyBanner_) delete readOnlyBanner_;
   if (File().WhyReadOnly().empty()) return;
@@ -70,6 +79,7 @@ bool EditTab::Save(const std::string& path) {
   if (!result.note.empty()) host_.ShowMessage(result.note, Host::Icon::Information);
   if (result.Ok()) {
     if (diskBanner_) delete diskBanner_;
+    if (isRenamed && isHolding_) HoldFile();
     ShowReadOnly();
     if (isRenamed) Renamed();
   }

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "core/host.h"
+#include "document/setup_lock.h"
 #include "edits/edited_file.h"
 
 class QVBoxLayout;
@@ -56,6 +57,9 @@ class EditTab : public QWidget {
  protected:
   /// What the tab shows, above its banners. Called once by the constructor of each kind.
   void SetBody(QWidget* body);
+  /// Keeps other editors from writing the file as long as it is edited here; where another one has it, it is read-only.
+  /// To be called once, after `SetBody`.
+  void HoldFile();
   /// Shows the file as it is now.
   virtual void Sync() = 0;
   /// After a save under another name.
@@ -71,6 +75,8 @@ class EditTab : public QWidget {
   QVBoxLayout* all_;
   QPointer<Banner> diskBanner_, readOnlyBanner_;
   QTimer disk_;
+  SetupLock lock_;
+  bool isHolding_ = false;
 };
 
 }  // namespace tervane

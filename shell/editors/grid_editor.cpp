@@ -72,6 +72,7 @@ GridEditor::GridEditor(const std::string& path, Host& host) : EditTab(host), edi
   row->addWidget(panel_);
   column->addLayout(row, 1);
   SetBody(body);
+  HoldFile();
   count_.setSingleShot(true);
   count_.setInterval(kCountDelay);
   connect(&count_, &QTimer::timeout, this, &GridEditor::ShowStatistics);

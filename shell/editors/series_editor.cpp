@@ -74,6 +74,7 @@ SeriesEditor::SeriesEditor(const std::string& path, Host& host) : EditTab(host),
   body->setStretchFactor(1, 1);
   body->setSizes({Theme::Get().Scaled(170), Theme::Get().Scaled(900)});
   SetBody(body);
+  HoldFile();
   rest_.setSingleShot(true);
   rest_.setInterval(kChartDelay);
   connect(&rest_, &QTimer::timeout, this, [this] {

@@ -267,6 +267,32 @@ TEST_F(GridEditorTest, TheSetupIsAskedOnceForWhatLiesAround) {
   EXPECT_THAT(titles(*domain), testing::ElementsAre("Model Grid"));
 }
 
+TEST_F(GridEditorTest, AFileThatIsOpenElsewhereIsSavedUnderAnotherName) {
+  EXPECT_TRUE(HolderOf(path_)) << "others see that it is edited";
+  const std::string other = setup_.Folder().File("other.nds2");
+  test::WriteCodes(other, {1, 2, 3});
+  SetupLock lock;
+  ASSERT_EQ(lock.Take(other), SetupLock::Outcome::Taken);
+  ASSERT_TRUE(setup_.Window().EditDataFile(ToQt(other)));
+  auto* held = qobject_cast<GridEditor*>(Tabs().currentWidget());
+  ASSERT_TRUE(held);
+  EXPECT_THAT(held->File().WhyReadOnly(), HasSubstr("open"));
+  EXPECT_TRUE(QTest::qWaitFor([&] { return setup_.Shows("Read-only: "); }));
+  ASSERT_EQ(held->Grid().Apply(CellOperation::Set, 5), "");
+  {
+    const NextAnswer ok("OK");
+    EXPECT_FALSE(held->Save(other));
+    EXPECT_THAT(ok.Text(), HasSubstr("under another name"));
+  }
+  EXPECT_TRUE(held->Save(setup_.Folder().File("mine.nds2")));
+  EXPECT_EQ(held->File().WhyReadOnly(), "");
+  EXPECT_FALSE(setup_.Shows("Read-only: "));
+  EXPECT_EQ(GridEdit(other).ValueOf(0, 0), 1);
+  EXPECT_TRUE(HolderOf(setup_.Folder().File("mine.nds2")));
+  setup_.Window().CloseTab(held);
+  EXPECT_FALSE(HolderOf(setup_.Folder().File("mine.nds2")));
+}
+
 TEST_F(GridEditorTest, AShownFileIsEditedByItsCommand) {
   const std::string other = setup_.Folder().File("other.nds2");
   test::WriteCodes(other, {1, 2, 3});
