@@ -66,15 +66,12 @@ def bench_grid() -> None:
         tervane.write_data_file(path, values, "Elevation", times=days, cell_size=10)
 
         def bare() -> None:
-            buffer = bytearray(os.path.getsize(path))
-            with open(path, "rb", buffering=0) as file:
-                file.readinto(buffer)
-            # As the values stand in the file, the most significant byte first.
-            numpy.frombuffer(buffer, dtype=">f4", count=values.size).astype(numpy.float32)
+            # As the values stand in the file, the most significant byte first, turned around in place.
+            numpy.fromfile(path, dtype=">f4", count=values.size).byteswap(inplace=True)
 
         file = tervane.open_data_file(path)
         module, peer = median_of(lambda: file.values()), median_of(bare)
-        print(f"{'bare read of 100 MB, in the order of the machine':45} {peer:8.2f} ms")
+        print(f"{'bare read of 100 MB, bytes turned around':45} {peer:8.2f} ms")
         print(f"{'the same as an array with missing values':45} {module:8.2f} ms")
         tell("against the bare read", module / peer, 1.2, "x")
 

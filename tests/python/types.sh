@@ -5,4 +5,4 @@ set -euo pipefail
 cd "$(mktemp -d)"
 trap 'rm -rf "$PWD"' EXIT
 "$1" -m mypy.stubtest tervane._tervane --allowlist "$2/tests/python/stubtest_allowed.txt"
-"$1" -m mypy --strict --ignore-missing-imports --cache-dir=/dev/null -p tervane
+"$1" -m mypy --config-file "$2/tests/python/mypy.ini" --cache-dir=/dev/null -p tervane
