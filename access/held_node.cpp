@@ -9,7 +9,9 @@
 namespace tervane {
 
 HeldNode::HeldNode(CYbSEKvfBase& node, std::shared_ptr<HeldNode> parent)
-    : node_(&node), parent_(std::move(parent)), serial_(node.Serial()), deaths_(NodeDeaths()) {}
+    : node_(&node), parent_(std::move(parent)), serial_(node.Serial()), deaths_(NodeDeaths()) {
+  if (parent_) number_ = node.GetParent()->GetNumberWhatIs(&node);
+}
 
 CYbSEKvfBase* HeldNode::Get() {
   // A root goes with its document, which tells it.
@@ -20,12 +22,16 @@ CYbSEKvfBase* HeldNode::Get() {
   return node_;
 }
 
-bool HeldNode::IsStillThere() const {
+bool HeldNode::IsStillThere() {
   const CYbSEKvfBase* parent = parent_->Get();
+  if (!parent) return false;
   // Its address is compared and not followed: another node may have it by now.
-  for (const CYbSEKvfBase* child = parent ? parent->GetFirstChild() : nullptr; child;
-       child = parent->GetNextChild(child))
-    if (child == node_) return child->Serial() == serial_;
+  if (const CYbSEKvfBase* child = parent->GetChild(number_); child == node_) return child->Serial() == serial_;
+  for (const CYbSEKvfBase* child = parent->GetFirstChild(); child; child = parent->GetNextChild(child)) {
+    if (child != node_) continue;
+    number_ = parent->GetNumberWhatIs(child);
+    return child->Serial() == serial_;
+  }
   return false;
 }
 

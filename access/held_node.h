@@ -22,12 +22,13 @@ class HeldNode {
   void Drop() { node_ = nullptr; }
 
  private:
-  bool IsStillThere() const;
+  bool IsStillThere();
 
   CYbSEKvfBase* node_;
   std::shared_ptr<HeldNode> parent_;
   std::uint64_t serial_;
   std::uint64_t deaths_;  ///< When it was last seen.
+  int number_ = 0;        ///< Its place below its parent then: looked at first.
 };
 
 }  // namespace tervane

@@ -96,7 +96,7 @@ CYbSEKvfBase* OpenSetup::InsertItem(CYbSEKvfBase& owner, int place, CYbSEKvfBase
     section = target ? AsSection(target->firstChild) : nullptr;
     if (!section) return refuse("what is to be copied has no section");
   }
-  const bool isBehind = place > static_cast<int>(items.Items().size());
+  const bool isBehind = place > items.Count();
   CYbSEKvfBase* item = isBehind ? items.Add() : items.Insert(place);
   keys_->Forget();
   if (!item)
@@ -111,16 +111,16 @@ CYbSEKvfBase* OpenSetup::InsertItem(CYbSEKvfBase& owner, int place, CYbSEKvfBase
 
 bool OpenSetup::RemoveItem(CYbSEKvfBase& owner, int place) {
   const ItemOwner items(&owner);
-  const std::vector<CYbSEKvfBase*> all = items.Items();
-  if (place < 1 || place > static_cast<int>(all.size())) return false;
-  items.Remove(*all[static_cast<std::size_t>(place) - 1]);
+  CYbSEKvfBase* item = items.Item(place);
+  if (!item) return false;
+  items.Remove(*item);
   keys_->Forget();
   return true;
 }
 
 bool OpenSetup::MoveItem(CYbSEKvfBase& owner, int from, int to) {
   const ItemOwner items(&owner);
-  const int count = static_cast<int>(items.Items().size());
+  const int count = items.Count();
   if (from < 1 || to < 1 || from > count || to > count) return false;
   keys_->Forget();
   for (; from > to; --from)

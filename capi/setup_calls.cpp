@@ -46,10 +46,11 @@ KeyUnits UnitsAt(SetupObject& object, const OpenSetup::Place& place, const char*
 }
 
 CYbSEKvfBase& ItemAt(CYbSEKvfBase& owner, int number) {
-  const std::vector<CYbSEKvfBase*> items = ItemOwner(&owner).Items();
-  if (number < 1 || number > static_cast<int>(items.size()))
-    Refuse(TERVANE_NOT_THERE, fmt::format("{}: there is no item {}: it has {}", PathOf(owner), number, items.size()));
-  return *items[static_cast<std::size_t>(number) - 1];
+  const ItemOwner items(&owner);
+  CYbSEKvfBase* item = items.Item(number);
+  if (!item)
+    Refuse(TERVANE_NOT_THERE, fmt::format("{}: there is no item {}: it has {}", PathOf(owner), number, items.Count()));
+  return *item;
 }
 
 /// Lets other threads use an object again.
@@ -152,7 +153,7 @@ tervane_result tervane_item_count(tervane_setup setup, const char* path, int* co
     Need({count});
     const ItemOwner items(&NodeAt(object, path));
     if (!items.Node()) Refuse(TERVANE_NOT_THERE, fmt::format("{}: it holds no items", path));
-    *count = static_cast<int>(items.Items().size());
+    *count = items.Count();
   });
 }
 

@@ -13,6 +13,12 @@ std::vector<CYbSEKvfBase*> ItemOwner::Items() const {
   return items;
 }
 
+CYbSEKvfBase* ItemOwner::Item(int place) const {
+  if (list_) return list_->GetItemNode(place);
+  const std::vector<CYbSEKvfBase*> items = Items();
+  return place >= 1 && place <= static_cast<int>(items.size()) ? items[static_cast<std::size_t>(place) - 1] : nullptr;
+}
+
 CYbSEKvfBase* ItemOwner::Add() const {
   if (list_) {
     const int count = list_->GetItemCount();

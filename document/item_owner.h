@@ -21,6 +21,9 @@ class ItemOwner {
     return list_ ? list_->GetNumberWhatIs(&node) > 0 : zones_ && dynamic_cast<const CFMSEKvfGroupBase*>(&node);
   }
   std::vector<CYbSEKvfBase*> Items() const;
+  int Count() const { return list_ ? list_->GetItemCount() : static_cast<int>(Items().size()); }
+  /// Null where there is none.
+  CYbSEKvfBase* Item(int place) const;
   /// A new one behind all others; null where none can be made.
   CYbSEKvfBase* Add() const;
   /// A new one of a list at a place that has one; null where none can be made, as in front of a zone.

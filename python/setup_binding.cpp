@@ -171,14 +171,14 @@ void BindNode(py::module_& module) {
           },
           "section"_a, "key"_a, "values"_a)
       .def_property_readonly("has_items", [](const Node& node) { return ItemOwner(&node.Get()).Node() != nullptr; })
-      .def("item_count", [](const Node& node) { return ItemOwner(&node.Get()).Items().size(); })
+      .def("item_count", [](const Node& node) { return ItemOwner(&node.Get()).Count(); })
       .def("items", [](const Node& node) { return NodesOf(node, true); })
       .def(
           "item",
-          [](const Node& node, std::size_t number) {
-            const std::vector<CYbSEKvfBase*> items = ItemOwner(&node.Get()).Items();
-            if (number < 1 || number > items.size()) throw py::index_error("there is no such item");
-            return NodeOf(node.setup, *items[number - 1]);
+          [](const Node& node, int number) {
+            CYbSEKvfBase* item = ItemOwner(&node.Get()).Item(number);
+            if (!item) throw py::index_error("there is no such item");
+            return Node{node.setup, std::make_shared<HeldNode>(*item, node.held)};
           },
           "number"_a)
       .def("insert_item", &InsertItem, "number"_a, "like"_a = py::none())
