@@ -57,7 +57,14 @@ Report MakeReport(CFlowModelDoc& document, const ReportOptions& options) {
   Report report;
   const auto* title = TitleOf(document);
   report.title = title && !title->Title.empty() ? title->Title : std::string(BaseNameOf(document.PathName()));
-  report.file = AbsoluteFromHere(document.PathName());
+  // Where it lies is nobody's business outside; the passport of the run tells it.
+  report.file = FileNameOf(document.PathName());
+  const FileStamp stamp = StampOf(document.PathName());
+  if (stamp.exists) {
+    const auto saved = std::chrono::time_point_cast<std::chrono::seconds>(std::chrono::file_clock::to_sys(stamp.time));
+    report.file += options.dates.In(fmt::format(
+        ", saved {:%Y-%m-%d %H:%M}", fmt::localtime(static_cast<std::time_t>(saved.time_since_epoch().count()))));
+  }
   report.logo = options.logo;
   const std::time_t now = std::chrono::system_clock::to_time_t(std::chrono::system_clock::now());
   report.made = options.dates.In(fmt::format("{:%Y-%m-%d %H:%M}, Tervane {}", fmt::localtime(now), kProgramVersion));
@@ -169,12 +176,14 @@ void ReportCoverage(ReportContext& context, std::vector<ReportBlock>& blocks) {
     ReportTable table{{"Period"}, {}};
     // Of many stations the domain says what counts.
     constexpr std::size_t kMostColumns = 8;
-    const std::size_t first = totals.columns.size() > kMostColumns ? totals.columns.size() - 1 : 0;
-    for (std::size_t column = first; column < totals.columns.size(); ++column)
-      table.heads.push_back(totals.ColumnText(column));
+    const auto domain = std::ranges::find(totals.columns, "domain", &ForcingTotals::Column::name);
+    const bool isDomain = totals.columns.size() > kMostColumns && domain != totals.columns.end();
+    const std::size_t first = isDomain ? static_cast<std::size_t>(domain - totals.columns.begin()) : 0;
+    const std::size_t end = isDomain ? first + 1 : std::min(kMostColumns, totals.columns.size());
+    for (std::size_t column = first; column < end; ++column) table.heads.push_back(totals.ColumnText(column));
     for (std::size_t period = 0; period < board.periods.size(); ++period) {
       auto& row = table.rows.emplace_back(std::vector<std::string>{board.periods[period].name});
-      for (std::size_t column = first; column < totals.columns.size(); ++column)
+      for (std::size_t column = first; column < end; ++column)
         row.push_back(totals.ValueText(column, period, board.periods[period].span, totals.Decimals()));
     }
     blocks.push_back(std::move(table));

@@ -42,7 +42,7 @@ struct ReportSection {
 };
 
 struct Report {
-  std::string title, file, made;  ///< Of the simulation; the setup's path; when and by what the report was made.
+  std::string title, file, made;  ///< Of the simulation; the setup's file; when and by what the report was made.
   std::string logo;               ///< The path of a picture; empty for none.
   std::vector<ReportSection> sections;
 };

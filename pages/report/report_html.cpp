@@ -29,7 +29,7 @@ nav a { color: #1f4e79; }
 table { border-collapse: collapse; margin: 8px 0 14px; }
 th, td { text-align: left; vertical-align: top; padding: 3px 14px 3px 0; border-bottom: 1px solid #e2e2e2; }
 th { border-bottom: 1px solid #909090; }
-td { white-space: pre-line; overflow-wrap: anywhere; }
+td { overflow-wrap: anywhere; }
 td:first-child { overflow-wrap: normal; min-width: 90px; }
 figure { margin: 8px 0 18px; }
 figure svg { max-width: 100%; height: auto; }
@@ -62,7 +62,8 @@ struct BlockWriter {
 
   void AddRow(const std::vector<std::string>& cells, const char* tag) const {
     html += "<tr>";
-    for (const std::string& cell : cells) html += fmt::format("<{0}>{1}</{0}>", tag, XmlText(cell));
+    for (const std::string& cell : cells)
+      html += fmt::format("<{0}>{1}</{0}>", tag, Replaced(XmlText(cell), "\n", "<br>"));
     html += "</tr>\n";
   }
 };
@@ -76,6 +77,12 @@ std::string_view TypeOfImage(std::string_view path) {
 }
 
 }  // namespace
+
+std::string ReportBlockInHtml(const ReportBlock& block, const PictureInHtml& picture, std::size_t number) {
+  std::string html;
+  std::visit(BlockWriter{html, picture, number}, block);
+  return html;
+}
 
 std::string ReportBody(const Report& report, const PictureInHtml& picture) {
   std::string html;

@@ -12,6 +12,9 @@ namespace tervane {
 /// How pictures stand in the text: as what is written for the picture of that number, counted from 0.
 using PictureInHtml = std::function<std::string(const ReportPicture& picture, std::size_t number)>;
 
+/// One block of a section; `number` is that of a picture.
+std::string ReportBlockInHtml(const ReportBlock& block, const PictureInHtml& picture, std::size_t number);
+
 /// The body of a report: headings, paragraphs, tables and pictures.
 std::string ReportBody(const Report& report, const PictureInHtml& picture);
 

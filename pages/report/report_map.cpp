@@ -20,7 +20,7 @@ constexpr int kMostPixels = 700;         ///< Of an image along a side.
 constexpr std::size_t kMostLegend = 16;  ///< Rows of a layer.
 constexpr std::size_t kMostLabels = 25;  ///< Points that bear their names.
 constexpr unsigned kHighlight = 0xef8636, kOthers = 0xe4e4e4, kOutline = 0x404040, kDomainLine = 0xb03030,
-                   kWater = 0x2060b0;
+                   kDomainFill = 0xdde8f2, kWater = 0x2060b0;
 
 struct LegendRow {
   unsigned color;
@@ -113,7 +113,9 @@ class LayerColors {
       byValue_[static_cast<float>(codes[place])] = number;
       const auto name = std::ranges::find(layer_.names, codes[place], &std::pair<unsigned, std::string>::first);
       std::string text = name != layer_.names.end() ? name->second : std::to_string(codes[place]);
-      if (place < 255) Add(ReportColor(place), std::move(text));
+      // Without a legend it lies below what the map is about.
+      const unsigned color = ReportColor(place);
+      if (place < 255) Add(layer_.withLegend ? color : Mixed(color, 0xffffff, 0.75), std::move(text));
     }
     if (codes.size() > kMostLegend)
       legend_.rows.push_back({0xffffff, fmt::format("and {} more", codes.size() - kMostLegend)});
@@ -179,7 +181,7 @@ class MapDrawing {
   void Add(const ShapeLayer& layer) {
     if (!layer.shapes) return;
     const bool arePoints = layer.shapes->Kind() == ShapeKind::Point || layer.shapes->Kind() == ShapeKind::MultiPoint;
-    const bool areFilled = layer.isFilled && layer.shapes->Kind() == ShapeKind::Polygon;
+    const bool areFilled = layer.isFilled && !layer.isDomain && layer.shapes->Kind() == ShapeKind::Polygon;
     std::map<std::string, unsigned> fills;
     Legend legend;
     std::size_t place = 0;
@@ -198,6 +200,7 @@ class MapDrawing {
         if (isNew && legend.rows.size() < kMostLegend)
           legend.rows.push_back({known->second, name != layer.names.end() ? name->second : value});
       }
+      if (layer.isDomain && layer.isFilled) fill = SvgColor(kDomainFill);
       if (isHighlighted && layer.shapes->Kind() == ShapeKind::Polygon) fill = SvgColor(kHighlight);
       std::string path;
       for (std::size_t part = 0; part < shape.parts.size(); ++part)

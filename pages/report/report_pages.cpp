@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <algorithm>
 #include <map>
+#include <set>
 
 #include <fmt/format.h>
 
@@ -22,8 +23,8 @@ namespace tervane {
 
 namespace {
 
-constexpr int kMostRows = 60;  ///< Of a table of a page.
-constexpr int kMostAlike = 2;  ///< Pages of one kind, such as those of stations, whose plots are shown.
+constexpr std::size_t kMostRows = 60;  ///< Of a table of a page.
+constexpr int kMostAlike = 2;          ///< Pages of one kind, such as those of stations, whose plots are shown.
 
 /// "Initial time step: 6" of a control, where it shows a value that people read.
 std::optional<std::string> ValueInWords(const Control& control) {
@@ -106,11 +107,22 @@ class PageDifferences {
     for (int column = 1; column <= table.ColumnCount(); ++column)
       if (!table.Column(column)->IsButton()) columns.push_back(column);
     for (const int column : columns) told.heads.push_back(Replaced(table.Head(column), "\n", " "));
-    for (int row = 1; row <= std::min(table.RowCount(), kMostRows); ++row) {
+    std::size_t more = 0;
+    for (int row = 1; row <= table.RowCount(); ++row) {
+      const auto isCheck = [&](int column) { return table.Kind(row, column) == CellKind::Check; };
+      // A list of all that may be chosen tells what is chosen.
+      if (!columns.empty() && isCheck(columns.front()) && table.Cell(row, columns.front()) == "0") continue;
+      if (told.rows.size() >= kMostRows) {
+        ++more;
+        continue;
+      }
       auto& cells = told.rows.emplace_back();
-      for (const int column : columns) cells.push_back(dates_.In(table.ShownCell(row, column)));
+      for (const int column : columns) {
+        const std::string text = table.ShownCell(row, column);
+        cells.push_back(!isCheck(column) ? dates_.In(text) : text == "1" ? "yes" : text == "0" ? "no" : text);
+      }
     }
-    if (table.RowCount() > kMostRows) told.rows.push_back({fmt::format("and {} more", table.RowCount() - kMostRows)});
+    if (more > 0) told.rows.push_back({fmt::format("and {} more", more)});
     if (!told.rows.empty() && !told.heads.empty()) tables.push_back(std::move(told));
   }
 
@@ -131,6 +143,16 @@ struct ChangedPage {
                               [](const auto& a, const auto& b) { return a.front() == b.front(); });
   }
 };
+
+/// Whether the tables of a page tell all that these pages do.
+bool AreToldBy(const ChangedPage& above, std::span<const ChangedPage> pages) {
+  std::set<std::string> told;
+  for (const ReportTable& table : above.tables)
+    for (const auto& row : table.rows) told.insert(row.begin(), row.end());
+  return std::ranges::all_of(pages, [&](const ChangedPage& page) {
+    return std::ranges::all_of(page.values.rows, [&](const auto& value) { return told.contains(value[1]); });
+  });
+}
 
 /// Several pages that are alike, a row each.
 void AddAlike(std::span<const ChangedPage> pages, std::vector<ReportBlock>& blocks) {
@@ -176,13 +198,13 @@ void ReportValues(ReportContext& context, std::vector<ReportBlock>& blocks) {
   for (auto page = pages.begin(); page != pages.end();) {
     const auto end = std::find_if_not(page, pages.end(), [&](const ChangedPage& other) { return other.IsLike(*page); });
     if (end - page >= kFewest) {
-      AddAlike({page, end}, blocks);
+      if (page == pages.begin() || !AreToldBy(*std::prev(page), {page, end})) AddAlike({page, end}, blocks);
       page = end;
       continue;
     }
     blocks.push_back(ReportHeading{page->place});
-    if (!page->values.rows.empty()) blocks.push_back(std::move(page->values));
-    for (ReportTable& table : page->tables) blocks.push_back(std::move(table));
+    if (!page->values.rows.empty()) blocks.push_back(page->values);
+    for (const ReportTable& table : page->tables) blocks.push_back(table);
     ++page;
   }
   if (blocks.empty()) blocks.push_back(ReportText{"All values are those of a new setup."});
@@ -206,7 +228,7 @@ void ReportDomain(ReportContext& context, std::vector<ReportBlock>& blocks) {
     MapContent map = domain->Type == CCatchmentKvf::kGridFile
                          ? FileMap(domain->GridFile())
                          : ShapeFileMap(domain->ShapeFile(), domain->ShapeAxisUnit);
-    for (ShapeLayer& shapes : map.shapes) shapes.isDomain = true;
+    for (ShapeLayer& shapes : map.shapes) shapes.isDomain = shapes.isFilled = true;
     return map;
   };
   blocks.push_back(std::move(table));
@@ -220,6 +242,7 @@ void ReportInputs(ReportContext& context, std::vector<ReportBlock>& blocks) {
   NobodyToAsk host;
   const std::vector<TreeEntry> entries = TreeEntries(context.document.Root(), kSetupDataTree);
   std::map<std::string, int> alike;
+  std::set<std::string> drawn;
   const CYbSEKvfBase* domain = context.document.Root().Important(kDomain);
   for (std::size_t place = 1; place < entries.size(); ++place) {
     const TreeEntry& entry = entries[place];
@@ -234,7 +257,8 @@ void ReportInputs(ReportContext& context, std::vector<ReportBlock>& blocks) {
       std::optional<ReportPicture> picture;
       if (control.kind == ControlKind::Map && control.map) picture = DrawMap(Finished(control.map));
       if (control.kind == ControlKind::Chart && control.chart) picture = DrawChart(Finished(control.chart));
-      if (!picture) return;
+      // What several pages show alike, such as the ground, stands once.
+      if (!picture || !drawn.insert(picture->svg).second) return;
       picture->caption = SpokenLabel(control.label);
       pictures.push_back(std::move(*picture));
     });
