@@ -143,7 +143,7 @@ int RunCommandLine(const std::vector<std::string>& arguments, std::ostream& plai
       "A PATH is section names joined by /, with #n behind a name for the n-th of equal names and :KEY for a key:\n"
       "SimSpec/SimTitle:Title. Exit status: 0 done, 1 findings or differences, 2 could not.");
   app.require_subcommand(1);
-  app.set_version_flag("--version", std::string("tervane ") + kProgramVersion);
+  app.set_version_flag("--version", "tervane " + ProgramBuild());
 
   int status = kDone;
   CommandOffers offers(app, {out, err}, status);

@@ -4,6 +4,7 @@
 #include <fmt/format.h>
 
 #include "cli/offers.h"
+#include "platform/text.h"
 
 namespace tervane {
 
@@ -78,13 +79,74 @@ complete -o filenames -F _tervane tervane
                      commands.substr(1), OptionNames(app), cases);
 }
 
+/// A text between single quotes of the shell, in which a colon parts a word from its description.
+std::string Quoted(std::string_view text) { return "'" + Replaced(Replaced(text, ":", "\\:"), "'", "'\\''") + "'"; }
+
+/// Words with what they are for, as `_describe` takes them.
+std::string Described(const CLI::App& app) {
+  std::string rows;
+  for (const CLI::App* each : app.get_subcommands([](const CLI::App*) { return true; }))
+    rows += fmt::format(" {}:{}", each->get_name(), Quoted(each->get_description()));
+  return rows;
+}
+
+std::string DescribedOptions(const CLI::App& app) {
+  std::string rows;
+  for (const CLI::Option* option : app.get_options())
+    for (const std::string& name : option->get_lnames())
+      rows += fmt::format(" --{}:{}", name, Quoted(option->get_description()));
+  return rows;
+}
+
+/// The same for zsh, which tells what commands and options are for.
+std::string ZshCompletion(const CLI::App& app) {
+  std::string cases;
+  for (const CLI::App* command : app.get_subcommands([](const CLI::App*) { return true; })) {
+    cases += fmt::format("    {})\n      options=({})\n", command->get_name(), DescribedOptions(*command));
+    const auto family = command->get_subcommands([](const CLI::App*) { return true; });
+    if (!family.empty()) cases += fmt::format("      words_=({})\n", Described(*command));
+    for (const CLI::App* each : family)
+      cases += fmt::format("      [[ $words[3] == {} ]] && options=({})\n", each->get_name(), DescribedOptions(*each));
+    cases += "      ;;\n";
+  }
+  return fmt::format(R"zsh(#compdef tervane
+# zsh completion of tervane
+_tervane() {{
+  local -a commands options words_ places
+  commands=({})
+  if ((CURRENT == 2)); then
+    _describe command commands
+    return
+  fi
+  case $words[2] in
+{}  esac
+  if [[ $PREFIX == -* ]]; then
+    _describe -o option options
+  elif ((CURRENT == 3 && $#words_)); then
+    _describe command words_
+  elif ((CURRENT == 4)) && [[ $words[2] == (show|page|why|get|set) ]]; then
+    places=(${{(f)"$(tervane tree $words[3] --all --paths 2>/dev/null)"}})
+    compadd -S '' -- $places
+  else
+    _files
+  fi
+}}
+if [[ $funcstack[1] == _tervane ]]; then _tervane "$@"; else compdef _tervane tervane; fi
+)zsh",
+                     Described(app), cases);
+}
+
 }  // namespace
 
 void OfferCompletion(CommandOffers& offers) {
-  offers.Offer("completion", "Print the completion script for bash; use: source <(tervane completion)", [offers] {
-    offers.Output().out << BashCompletion(offers.Whole());
-    return kDone;
-  });
+  auto isZsh = std::make_shared<bool>(false);
+  offers
+      .Offer("completion", "Print the completion script for a shell; use: source <(tervane completion)",
+             [offers, isZsh] {
+               offers.Output().out << (*isZsh ? ZshCompletion(offers.Whole()) : BashCompletion(offers.Whole()));
+               return kDone;
+             })
+      .AddChoice("SHELL", *isZsh, {std::pair("bash", false), std::pair("zsh", true)}, "The shell, bash unless told");
 }
 
 }  // namespace tervane

@@ -242,7 +242,7 @@ int main(int argc, char** argv) {
   };
   commandLine.add_option("--report-sections", takenBy(TakeReportSections), "Some of its sections alone");
   commandLine.add_option("--report-dates", takenBy(TakeReportDates), "How it writes dates: iso, en, de or fr");
-  commandLine.set_version_flag("--version", std::string("quarzel ") + kProgramVersion);
+  commandLine.set_version_flag("--version", "quarzel " + ProgramBuild());
   CLI11_PARSE(commandLine, argc, argv);
 
   // A report needs no display.
