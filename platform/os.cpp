@@ -8,7 +8,9 @@
 #include "platform/beside_program.h"
 
 #ifdef _WIN32
+#ifndef NOMINMAX
 #define NOMINMAX
+#endif
 #define WIN32_LEAN_AND_MEAN
 #include <algorithm>
 #include <clocale>
