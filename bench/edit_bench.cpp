@@ -67,6 +67,7 @@ void MeasureModel(const std::string& path) {
   Report("a stroke over 3,000 cells, 40 wide", stroke, kStroke, "ms");
   ReportPeer("  a bare loop that writes and remembers as many cells", BareLoop(edit), "ms");
   Report("the same taken back", MedianOf([&] { edit.Undo(); }), kStroke, "ms");
+  edit.PaintLine({at(10, 20), at(110, 20)}, 1, 5);
   const std::size_t before = edit.BytesOfSteps();
   edit.PaintLine({at(10, 10), at(110, 10)}, 1, 5);
   Report("a line of 100 cells: what its step takes", static_cast<double>(edit.BytesOfSteps() - before) / 1024, 4, "kB");
@@ -81,7 +82,8 @@ void MeasureEditor(const std::string& path) {
   auto& canvas = *editor.findChild<MapCanvas*>();
   canvas.WaitUntilReady();
   canvas.grab();
-  editor.findChild<QLineEdit*>()->setText("900");
+  for (QLineEdit* line : editor.findChildren<QLineEdit*>())
+    if (line->accessibleName() == "Value") line->setText("900");
   for (QSpinBox* box : editor.findChildren<QSpinBox*>())
     if (box->accessibleName() == "Width") box->setValue(kWidth);
   editor.SetTool(GridEditor::Tool::Brush);

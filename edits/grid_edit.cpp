@@ -20,16 +20,32 @@ namespace {
 /// Beyond, neighbouring whole numbers are the same in single precision.
 constexpr double kMostCode = 1 << 24;
 
-void Include(std::optional<CellWindow>& window, int i, int j, int count) {
-  if (!window) {
-    window = {i, j, count, 1};
-    return;
+/// The smallest window that holds both.
+CellWindow Around(const CellWindow& a, const CellWindow& b) {
+  const int left = std::min(a.i, b.i), low = std::min(a.j, b.j);
+  return {left, low, std::max(a.i + a.nx, b.i + b.nx) - left, std::max(a.j + a.ny, b.j + b.ny) - low};
+}
+
+/// Adds a part of a row.
+void Include(std::vector<CellWindow>& windows, int i, int j, int count) {
+  constexpr std::size_t kMostWindows = 20'000;
+  if (!windows.empty()) {
+    // Rows of one shape are one window.
+    CellWindow& last = windows.back();
+    if (last.i == i && last.nx == count && last.j + last.ny == j) {
+      ++last.ny;
+      return;
+    }
+    if (last.j == j && last.ny == 1 && i >= last.i && i <= last.i + last.nx) {
+      last.nx = std::max(last.nx, i + count - last.i);
+      return;
+    }
   }
-  const int right = std::max(window->i + window->nx, i + count), top = std::max(window->j + window->ny, j + 1);
-  window->i = std::min(window->i, i);
-  window->j = std::min(window->j, j);
-  window->nx = right - window->i;
-  window->ny = top - window->j;
+  windows.push_back({i, j, count, 1});
+  if (windows.size() <= kMostWindows) return;
+  CellWindow all = windows.front();
+  for (const CellWindow& window : windows) all = Around(all, window);
+  windows = {all};
 }
 
 }  // namespace
@@ -142,7 +158,7 @@ std::string GridEdit::Show(int item, const GridSlice& slice) {
     });
     unsaved_.erase(found);
   }
-  changed_.reset();
+  changed_.clear();
   if (isOtherGrid) {
     SelectNothing();
     stroke_ = Cells();

@@ -66,8 +66,8 @@ class GridEdit : public EditedFile {
   float ValueOf(int i, int j) const { return grid_->Value(i, j); }
   /// Why the item cannot take a value; kDeleteValue it always can.
   std::string WhyNotValue(double value) const;
-  /// The cells that were changed since this was last asked.
-  std::optional<CellWindow> TakeChanged() { return std::exchange(changed_, {}); }
+  /// The cells that were changed since this was last asked; of very many scattered ones, what lies around them.
+  std::vector<CellWindow> TakeChanged() { return std::exchange(changed_, {}); }
 
   // ---- Painting: all up to `EndStroke` is one step
 
@@ -141,7 +141,7 @@ class GridEdit : public EditedFile {
   std::shared_ptr<CTvn2DOrthoRotatedGridData> grid_;
   std::vector<RowRange> touched_;     ///< Of each row of the shown page, what differs from the file.
   std::map<Page, CellRuns> unsaved_;  ///< Of other pages.
-  std::optional<CellWindow> changed_;
+  std::vector<CellWindow> changed_;
   CellSet selection_;
   bool hasSelection_ = false;
 

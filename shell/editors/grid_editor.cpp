@@ -273,19 +273,24 @@ void GridEditor::WaitForPicture() {
 }
 
 bool GridEditor::Recolour() {
-  const auto changed = edit_.TakeChanged();
-  if (!changed) return false;
-  bool isBeyond = false;
-  for (int j = changed->j; j < changed->j + changed->ny && !isBeyond; ++j)
-    for (int i = changed->i; i < changed->i + changed->nx; ++i) {
-      const float value = edit_.ValueOf(i, j);
-      if (value == kDeleteValue) continue;
-      isBeyond = edit_.IsCodes() ? value >= 0 && !std::ranges::binary_search(codes_, static_cast<unsigned>(value))
-                                 : !range_ || value < range_->first || value > range_->second;
-      if (isBeyond) break;
+  const std::vector<CellWindow> changed = edit_.TakeChanged();
+  if (changed.empty()) return false;
+  const auto isBeyondColours = [this](float value) {
+    if (value == kDeleteValue) return false;
+    if (edit_.IsCodes()) return value >= 0 && !std::ranges::binary_search(codes_, static_cast<unsigned>(value));
+    return !range_ || value < range_->first || value > range_->second;
+  };
+  const std::vector<float>& values = edit_.Grid()->Values();
+  const int nx = edit_.Grid()->Geometry().nx;
+  const bool isBeyond = std::ranges::any_of(changed, [&](const CellWindow& window) {
+    for (int j = window.j; j < window.j + window.ny; ++j) {
+      const auto row = values.begin() + static_cast<std::ptrdiff_t>(j) * nx + window.i;
+      if (std::any_of(row, row + window.nx, isBeyondColours)) return true;
     }
+    return false;
+  });
   if (!isBeyond) {
-    map_->Canvas().UpdateCells(*changed);
+    map_->Canvas().UpdateCells(changed);
     return false;
   }
   GridLayer layer = map_->Canvas().Content().grids.front();

@@ -155,18 +155,19 @@ void MapCanvas::ShowFrame(const GridLayer& grid, std::shared_ptr<const GridPictu
   Redraw();
 }
 
-void MapCanvas::UpdateCells(const CellWindow& cells) {
-  if (layers_.empty() || !layers_.front()->picture || layers_.front()->isOld) return;
+void MapCanvas::UpdateCells(std::span<const CellWindow> windows) {
+  if (windows.empty() || layers_.empty() || !layers_.front()->picture || layers_.front()->isOld) return;
   // It was made here, and nobody else draws it.
-  std::const_pointer_cast<GridPicture>(layers_.front()->picture)->Update(layers_.front()->grid, cells);
+  std::const_pointer_cast<GridPicture>(layers_.front()->picture)->Update(layers_.front()->grid, windows);
   if (scene_.isNull()) return update();
   // What lies in the corners of those cells, and as much as a coarser level shows of them.
   const GridTransform transform(layers_.front()->grid.grid->Geometry());
   const double around = 1 + 2 * window_.metresPerPixel / layers_.front()->grid.grid->Geometry().cellSize;
   QPolygonF corners;
-  for (const double i : {cells.i - around, cells.i + cells.nx + around})
-    for (const double j : {cells.j - around, cells.j + cells.ny + around})
-      corners << window_.ToScreen(transform.ToWorld({i, j}));
+  for (const CellWindow& cells : windows)
+    for (const double i : {cells.i - around, cells.i + cells.nx + around})
+      for (const double j : {cells.j - around, cells.j + cells.ny + around})
+        corners << window_.ToScreen(transform.ToWorld({i, j}));
   const QRectF part = QRectF(corners.boundingRect().toAlignedRect()) & window_.rect;
   if (part.isEmpty()) return;
   QPainter painter(&scene_);

@@ -7,6 +7,7 @@
 #include <atomic>
 #include <memory>
 #include <optional>
+#include <span>
 #include <vector>
 
 #include "forms/plots.h"
@@ -44,7 +45,7 @@ class MapCanvas : public QWidget {
   void ShowFrame(const GridLayer& grid, std::shared_ptr<const GridPicture> picture, std::optional<ArrowLayer> arrows,
                  bool isPassing);
   /// Cells of the first grid have other values, within the colours that it has.
-  void UpdateCells(const CellWindow& cells);
+  void UpdateCells(std::span<const CellWindow> windows);
   /// The first grid has other values or colours; what is seen stays until its picture is ready.
   void RemakeGrid(const GridLayer& grid);
   /// The user drags for this, or no longer.

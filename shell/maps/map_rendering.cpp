@@ -102,19 +102,19 @@ std::shared_ptr<const GridPicture> GridPicture::Make(const GridLayer& layer, con
     picture->Paint(layer, {0, row, nx, std::min(kRows, ny - row)});
   }
   constexpr int kCoarsest = 64;
+  const Ranks rank = picture->RanksOfColors();
   while (std::max(picture->levels_.back().nx, picture->levels_.back().ny) > kCoarsest) {
     if (isGivenUp) return nullptr;
     const Level& finer = picture->levels_.back();
     Level level{(finer.nx + 1) / 2, (finer.ny + 1) / 2, {}};
     level.colors.resize(static_cast<std::size_t>(level.nx) * static_cast<std::size_t>(level.ny));
-    picture->Halve(finer, level, {0, 0, level.nx, level.ny});
+    Halve(finer, level, {0, 0, level.nx, level.ny}, rank);
     picture->levels_.push_back(std::move(level));
   }
   return picture;
 }
 
-void GridPicture::Update(const GridLayer& layer, const CellWindow& cells) {
-  CellWindow changed = cells;
+void GridPicture::Update(const GridLayer& layer, std::span<const CellWindow> windows) {
   const auto clip = [](CellWindow& window, int nx, int ny) {
     const int right = std::min(window.i + window.nx, nx), top = std::min(window.j + window.ny, ny);
     window.i = std::max(window.i, 0);
@@ -122,20 +122,35 @@ void GridPicture::Update(const GridLayer& layer, const CellWindow& cells) {
     window.nx = right - window.i;
     window.ny = top - window.j;
   };
-  // How the neighbours are lit follows from a cell, too.
-  if (layer.isHillshaded && !layer.isCodes) changed = {cells.i - 1, cells.j - 1, cells.nx + 2, cells.ny + 2};
-  clip(changed, geometry_.nx, geometry_.ny);
-  if (changed.nx <= 0 || changed.ny <= 0) return;
-  Paint(layer, changed);
-  for (std::size_t number = 1; number < levels_.size(); ++number) {
-    const int right = (changed.i + changed.nx - 1) / 2, top = (changed.j + changed.ny - 1) / 2;
-    changed.i /= 2;
-    changed.j /= 2;
-    changed.nx = right + 1 - changed.i;
-    changed.ny = top + 1 - changed.j;
-    clip(changed, levels_[number].nx, levels_[number].ny);
-    Halve(levels_[number - 1], levels_[number], changed);
+  const bool isLit = layer.isHillshaded && !layer.isCodes;
+  std::vector<CellWindow> changed;
+  for (CellWindow window : windows) {
+    // How the neighbours are lit follows from a cell, too.
+    if (isLit) window = {window.i - 1, window.j - 1, window.nx + 2, window.ny + 2};
+    clip(window, geometry_.nx, geometry_.ny);
+    if (window.nx <= 0 || window.ny <= 0) continue;
+    Paint(layer, window);
+    changed.push_back(window);
   }
+  const Ranks rank = RanksOfColors();
+  for (std::size_t number = 1; number < levels_.size(); ++number)
+    for (CellWindow& window : changed) {
+      const int right = (window.i + window.nx - 1) / 2, top = (window.j + window.ny - 1) / 2;
+      window.i /= 2;
+      window.j /= 2;
+      window.nx = right + 1 - window.i;
+      window.ny = top + 1 - window.j;
+      Halve(levels_[number - 1], levels_[number], window, rank);
+    }
+}
+
+GridPicture::Ranks GridPicture::RanksOfColors() const {
+  // An empty cell never stands for others. Of codes the rarest one does, so that a single cell of it stays visible.
+  Ranks rank{};
+  for (std::size_t color = 0; color < rank.size(); ++color)
+    rank[color] = palette_.KeepsSingleCells() ? cellsOfColor_[color] : 1;
+  rank[0] = std::numeric_limits<std::size_t>::max();
+  return rank;
 }
 
 void GridPicture::Paint(const GridLayer& layer, const CellWindow& cells) {
@@ -160,12 +175,7 @@ void GridPicture::Paint(const GridLayer& layer, const CellWindow& cells) {
   }
 }
 
-void GridPicture::Halve(const Level& finer, Level& level, const CellWindow& cells) const {
-  // An empty cell never stands for others. Of codes the rarest one does, so that a single cell of it stays visible.
-  std::array<std::size_t, MapPalette::kMostColors + 1> rank{};
-  for (std::size_t color = 0; color < rank.size(); ++color)
-    rank[color] = palette_.KeepsSingleCells() ? cellsOfColor_[color] : 1;
-  rank[0] = std::numeric_limits<std::size_t>::max();
+void GridPicture::Halve(const Level& finer, Level& level, const CellWindow& cells, const Ranks& rank) {
   for (int j = cells.j; j < cells.j + cells.ny; ++j) {
     const std::uint8_t* lower = &finer.colors[static_cast<std::size_t>(2 * j) * static_cast<std::size_t>(finer.nx)];
     const std::uint8_t* upper = 2 * j + 1 < finer.ny ? lower + finer.nx : lower;

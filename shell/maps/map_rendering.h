@@ -6,10 +6,12 @@
 
 #include <QImage>
 #include <QPainter>
+#include <array>
 #include <atomic>
 #include <cstdint>
 #include <memory>
 #include <optional>
+#include <span>
 #include <vector>
 
 #include "data/file_geometry.h"
@@ -27,7 +29,7 @@ class GridPicture {
                                                  const std::atomic<bool>& isGivenUp);
 
   /// Cells of the layer have other values; the colours stay. Only of a picture that nobody else draws.
-  void Update(const GridLayer& layer, const CellWindow& cells);
+  void Update(const GridLayer& layer, std::span<const CellWindow> windows);
 
   const MapPalette& Palette() const { return palette_; }
   /// Draws what the window shows of the grid; `pixelRatio` is that of the device.
@@ -41,8 +43,11 @@ class GridPicture {
 
   /// Colours for those cells of the finest level.
   void Paint(const GridLayer& layer, const CellWindow& cells);
+  /// Of the four colours that become one, that with the least rank counts.
+  using Ranks = std::array<std::size_t, MapPalette::kMostColors + 1>;
+  Ranks RanksOfColors() const;
   /// The next coarser level of those cells.
-  void Halve(const Level& finer, Level& level, const CellWindow& cells) const;
+  static void Halve(const Level& finer, Level& level, const CellWindow& cells, const Ranks& rank);
   const Level& LevelFor(double cellsPerPixel, int& number) const;
 
   GridGeometry geometry_;

@@ -118,7 +118,7 @@ TEST_F(GridEditTest, WhatIsPaintedIsOneStepAndTheSameOnTurnedGrids) {
       const std::vector<float> after = Values(edit);
       EXPECT_NE(after, before);
       EXPECT_TRUE(edit.IsModified());
-      EXPECT_TRUE(edit.TakeChanged().has_value());
+      EXPECT_FALSE(edit.TakeChanged().empty());
       EXPECT_EQ(edit.Undo(), "");
       EXPECT_EQ(Values(edit), before);
       EXPECT_FALSE(edit.CanUndo());
