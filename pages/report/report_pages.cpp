@@ -23,8 +23,9 @@ namespace tervane {
 
 namespace {
 
-constexpr std::size_t kMostRows = 60;  ///< Of a table of a page.
-constexpr int kMostAlike = 2;          ///< Pages of one kind, such as those of stations, whose plots are shown.
+constexpr std::string_view kNoUnit = "-";  ///< Of what has no dimension.
+constexpr std::size_t kMostRows = 60;      ///< Of a table of a page.
+constexpr int kMostAlike = 2;              ///< Pages of one kind, such as those of stations, whose plots are shown.
 
 /// "Initial time step: 6" of a control, where it shows a value that people read.
 std::optional<std::string> ValueInWords(const Control& control) {
@@ -46,7 +47,7 @@ std::optional<std::string> ValueInWords(const Control& control) {
     case ControlKind::Date:
     case ControlKind::File: {
       const std::string unit = control.UnitText(), value = Replaced(control.Text(), "\n", " ");
-      return unit.empty() || value.empty() ? value : fmt::format("{} {}", value, unit);
+      return unit.empty() || unit == kNoUnit || value.empty() ? value : fmt::format("{} {}", value, unit);
     }
     default:
       return std::nullopt;
@@ -60,7 +61,9 @@ std::string DefaultInWords(KeyDefaults& defaults, const Control& control) {
   std::size_t begin = tip.starts_with(kHead) ? 0 : tip.find(std::string("\n") + std::string(kHead));
   if (begin == std::string::npos) return {};
   begin += kHead.size() + (tip[begin] == '\n' ? 1 : 0);
-  return tip.substr(begin, tip.find('\n', begin) - begin);
+  std::string text = tip.substr(begin, tip.find('\n', begin) - begin);
+  if (text.ends_with(fmt::format(" {}", kNoUnit))) text.resize(text.size() - kNoUnit.size() - 1);
+  return text;
 }
 
 /// What one page shows otherwise than a new setup.
@@ -122,8 +125,18 @@ class PageDifferences {
         cells.push_back(!isCheck(column) ? dates_.In(text) : text == "1" ? "yes" : text == "0" ? "no" : text);
       }
     }
+    LeaveEmptyColumns(told);
     if (more > 0) told.rows.push_back({fmt::format("and {} more", more)});
     if (!told.rows.empty() && !told.heads.empty()) tables.push_back(std::move(told));
+  }
+
+  static void LeaveEmptyColumns(ReportTable& table) {
+    for (std::size_t column = table.heads.size(); column-- > 0;) {
+      if (!std::ranges::all_of(table.rows, [&](const auto& row) { return row[column].empty(); })) continue;
+      const auto place = static_cast<std::ptrdiff_t>(column);
+      table.heads.erase(table.heads.begin() + place);
+      for (auto& row : table.rows) row.erase(row.begin() + place);
+    }
   }
 
   KeyDefaults& defaults_;
@@ -187,6 +200,10 @@ void ReportValues(ReportContext& context, std::vector<ReportBlock>& blocks) {
     if (!IsOfModel(entry)) continue;
     const auto page = MakePageToRead(*entry.page, *entry.node, {context.document, host, {}});
     if (!page) continue;
+    // What a table tells of the cells of zones is computed for the map beside it.
+    page->Form().ForEach([](Control& control) {
+      if (control.kind == ControlKind::Map && control.map && control.IsShown()) Finished(control.map);
+    });
     KeyDefaults defaults;
     PageDifferences differences(defaults, context.dates);
     differences.Add(page->Form());
