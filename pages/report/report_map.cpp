@@ -194,7 +194,8 @@ class MapDrawing {
       std::string fill = "none";
       if (areFilled && shape.HasValue()) {
         const std::string value = TextOf(shape.Value());
-        const auto [known, isNew] = fills.try_emplace(value, ReportColor(fills.size()));
+        // Quiet, so that lines over it are seen.
+        const auto [known, isNew] = fills.try_emplace(value, Mixed(ReportColor(fills.size()), 0xffffff, 0.4));
         fill = SvgColor(known->second);
         const auto name = std::ranges::find(layer.names, value, &std::pair<std::string, std::string>::first);
         if (isNew && legend.rows.size() < kMostLegend)
@@ -207,11 +208,13 @@ class MapDrawing {
         AddPath(path, std::span(shape.points).subspan(shape.parts[part], shape.PartEnd(part) - shape.parts[part]),
                 layer.shapes->Kind() == ShapeKind::Polygon);
       svg_ += fmt::format(
-          "<path d=\"{}\" fill=\"{}\" fill-opacity=\"0.6\" fill-rule=\"evenodd\" stroke=\"{}\" "
+          "<path d=\"{}\" fill=\"{}\"  fill-rule=\"evenodd\" stroke=\"{}\" "
           "stroke-width=\"{}\"/>\n",
           path, fill, SvgColor(layer.lineColor.value_or(layer.isDomain ? kDomainLine : kOutline)),
           layer.isDomain ? 1.8 : 0.8);
     }
+    if (fills.size() > kMostLegend)
+      legend.rows.push_back({0xffffff, fmt::format("and {} more", fills.size() - kMostLegend)});
     if (!legend.rows.empty()) AddLegend(legend);
   }
 

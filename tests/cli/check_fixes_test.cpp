@@ -9,7 +9,9 @@
 #include "data/datafile_writer.h"
 #include "data/series_file.h"
 #include "document/setup_lock.h"
+#include "geometry/shapes.h"
 #include "platform/item_types.h"
+#include "spatial/domain.h"
 #include "tests/support/command_outcome.h"
 #include "tests/support/data_files.h"
 #include "tests/support/setup.h"
@@ -159,6 +161,9 @@ TEST_F(CheckFixes, ValuesOutsideWhatIsAllowedBecomeTheNearest) {
        "SIMEND = 2000, 3, 1, 0, 0 } }\nsection ModelCompWQ { section SimulationPeriodWQ {\n"
        "SimStart = 1999, 1, 1, 0, 0\nSimEnd = 2000, 2, 1, 0, 0 } }",
        "ModelCompWQ/SimulationPeriodWQ:SimStart", "date-within-simulation", "2000, 1, 1, 0, 0"},
+      {"section SimSpec { section ModelComp { WQ = 1 } }\nsection Species { NumberOfSpecies = 1 }\n"
+       "section Sources { NumberOfSources = 1\nsection Source_1 { Species = \"gone\"\nExtentType = 0 } }",
+       "Sources/Source_1:Species", "offer", "Species_1"},
   };
   for (const auto& row : rows) {
     SCOPED_TRACE(std::string(row.path) + " " + row.after);
@@ -167,6 +172,26 @@ TEST_F(CheckFixes, ValuesOutsideWhatIsAllowedBecomeTheNearest) {
     EXPECT_THAT(fixed.out, HasSubstr(fmt::format("{}: fix {}: {}: ", file, row.kind, row.path)));
     EXPECT_EQ(Value(row.path), std::string(row.after) + "\n");
   }
+}
+
+TEST_F(CheckFixes, TheDomainTakesTheProjectionOfItsShapes) {
+  CTvnShapeData shapes;
+  shapes.Create(ShapeKind::Polygon, {{"CODE", AttributeKind::Whole}}, "EPSG:32632");
+  const double x = 500'000, y = 5'000'000;
+  shapes.AddShape(
+      {{{x, y}, {x, y + 1000}, {x + 1000, y + 1000}, {x + 1000, y}, {x, y}}, {}, {}, {0}, {std::int64_t{1}}});
+  test::Require(shapes.SaveShapeFile(folder.File("domain.shp")).error);
+  CFlowModelDoc document;
+  CCatchmentKvf& domain = *document.Root().Important(kDomain);
+  domain.Type = CCatchmentKvf::kShapeFile;
+  domain.ShapeFile().Choose(FileName("domain.shp", folder.Path()), {});
+  domain.x0Shp = x;
+  domain.y0Shp = y;
+  domain.MapProjShp = "EPSG:32633";
+  ASSERT_TRUE(document.OnSaveDocument(file)) << document.Error();
+  EXPECT_THAT(Fix().out,
+              HasSubstr("fix projection: Catchment:MapProjShp: WGS 84 / UTM zone 33N -> WGS 84 / UTM zone 32N"));
+  EXPECT_THAT(Fix().out, AllOf(HasSubstr("nothing was fixed"), Not(HasSubstr("another projection"))));
 }
 
 TEST_F(CheckFixes, WhatCannotBeDoneIsToldAndWritesNothing) {
