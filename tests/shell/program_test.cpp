@@ -23,7 +23,7 @@
 #include "shell/relief/relief_window.h"
 #include "tests/shell/opened_setup.h"
 
-namespace tervane::monkey_test {
+namespace tervane::program_test {
 namespace {
 
 int Wanted(const char* variable, int otherwise) {
@@ -220,4 +220,4 @@ TEST(Monkey, WhateverIsPressedAndTypedIsUndoneAndKept) {
 }
 
 }  // namespace
-}  // namespace tervane::monkey_test
+}  // namespace tervane::program_test
