@@ -224,9 +224,9 @@ class Drawer {
     const auto work = [&] {
       for (std::size_t i = next++; i < count; i = next++) task(i);
     };
-    const std::size_t helpers = std::min<std::size_t>(count, std::max(1U, std::thread::hardware_concurrency())) - 1;
+    const std::size_t others = std::min<std::size_t>(count, std::max(1U, std::thread::hardware_concurrency())) - 1;
     std::vector<std::thread> threads;
-    for (std::size_t i = 0; i < helpers; ++i) threads.emplace_back(work);
+    for (std::size_t i = 0; i < others; ++i) threads.emplace_back(work);
     work();
     for (std::thread& thread : threads) thread.join();
   }
