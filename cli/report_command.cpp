@@ -12,6 +12,7 @@
 #include "platform/beside_program.h"
 #include "platform/os_process.h"
 #include "platform/paths.h"
+#include "platform/running_process.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -30,7 +31,9 @@ int WritePdf(const ReportCommandOptions& options, Streams streams) {
   if (desktop.empty())
     return Refuse(streams, "a PDF is drawn by quarzel, which is not beside this program: write an .html, and print it");
   // It says on the file what it has to say.
-  const std::string log = options.out + ".log";
+  std::string log;
+  for (int number = 1; log.empty() || FileExists(log); ++number)
+    log = fmt::format("{}.{}-{}.log", options.out, RunningProcess::This().process, number);
   os::ProgramStart start{
       desktop, {AbsoluteFromHere(options.setup), "--report", AbsoluteFromHere(options.out)}, {}, log};
   for (const auto& [name, value] : {std::pair<const char*, const std::string&>{"--report-sections", options.sections},

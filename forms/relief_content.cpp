@@ -8,10 +8,13 @@
 #include <utility>
 
 #include "forms/section_profile.h"
+#include "platform/units.h"
 
 namespace tervane {
 
 namespace {
+
+constexpr int kMetre = 1000;
 
 std::vector<SectionPoint> CentresOfRaster(const GridGeometry& raster) {
   const GridTransform transform(raster);
@@ -82,7 +85,16 @@ std::string ReliefOfValues(const CTvn2DOrthoRotatedGridData& values, Relief& rel
   relief = {};
   relief.raster = ReliefRaster(values.Geometry());
   ReliefBody surface{.name = values.ItemName(), .top = {}, .color = 0};
-  surface.top = Floats(ValuesAlong(values, CentresOfRaster(relief.raster), GridSampling::Nearest));
+  const std::vector<SectionPoint> centres = CentresOfRaster(relief.raster);
+  const Unit* unit = FindUnit(values.ItemUnit());
+  if (unit && ConversionBetween(unit->scale, FindUnit(kMetre)->scale)) {
+    const std::vector<double> noGround(centres.size(), std::numeric_limits<double>::quiet_NaN());
+    const Level level{std::shared_ptr<const CTvn2DOrthoRotatedGridData>(std::shared_ptr<void>(), &values)};
+    surface.top = Floats(ElevationsAlong(level, centres, noGround, GridSampling::Nearest));
+  } else {
+    surface.top = Floats(ValuesAlong(values, centres, GridSampling::Nearest));
+    relief.unit = unit ? std::string(unit->abbreviation) : std::string();
+  }
   if (!HasNumbers(surface.top)) return "Nothing here has a height.";
   relief.bodies.push_back(std::move(surface));
   return {};

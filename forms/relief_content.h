@@ -33,7 +33,8 @@ GridGeometry ReliefRaster(GridGeometry grid);
 /// there is none: nothing varies from place to place, or the ground is not known.
 std::string ReliefOf(const SectionContent& section, Relief& relief);
 
-/// The values of a grid as heights, where nothing is known of the ground. Gives why there is none.
+/// The values of a grid as heights, where nothing is known of the ground; in its own unit where that is no length.
+/// Gives why there is none.
 std::string ReliefOfValues(const CTvn2DOrthoRotatedGridData& values, Relief& relief);
 
 /// One of these, made beside the window: sampling takes its time. `values` serve where the section has no ground, and

@@ -52,6 +52,8 @@ struct Relief {
   GridGeometry raster;
   std::vector<ReliefBody> bodies;  ///< From the top down; of two at one place the first is seen.
   std::vector<ReliefWell> wells;
+  /// Of heights that stand for something else than lengths, such as rain; nothing for metres.
+  std::optional<std::string> unit = {};
 
   /// The lowest and highest height of all bodies and wells; nothing where there is none.
   std::optional<std::pair<double, double>> Heights() const;

@@ -19,18 +19,18 @@ namespace {
 struct LayerFile {
   std::string_view extension;
   COverlayItemKvf::Kind kind;
-  std::array<std::string_view, 2> places = {};
+  std::array<std::string_view, 3> places = {};
 
   bool IsBelow() const { return kind == COverlayItemKvf::kImage || kind == COverlayItemKvf::kGrid; }
 };
 constexpr std::array kLayerFiles{
-    LayerFile{".bmp", COverlayItemKvf::kImage, {".bmpw", ".bpw"}},
-    LayerFile{".jpg", COverlayItemKvf::kImage, {".jpgw", ".jpw"}},
-    LayerFile{".jpeg", COverlayItemKvf::kImage, {".jpgw", ".jpw"}},
-    LayerFile{".gif", COverlayItemKvf::kImage, {".gifw", ".giw"}},
-    LayerFile{".png", COverlayItemKvf::kImage, {".pngw", ".pnw"}},
-    LayerFile{".tif", COverlayItemKvf::kImage, {".tifw", ".tiw"}},
-    LayerFile{".tiff", COverlayItemKvf::kImage, {".tifw", ".tiw"}},
+    LayerFile{".bmp", COverlayItemKvf::kImage, {".bmpw", ".bpw", {}}},
+    LayerFile{".jpg", COverlayItemKvf::kImage, {".jpgw", ".jpw", ".jgw"}},
+    LayerFile{".jpeg", COverlayItemKvf::kImage, {".jpgw", ".jpw", ".jgw"}},
+    LayerFile{".gif", COverlayItemKvf::kImage, {".gifw", ".giw", ".gfw"}},
+    LayerFile{".png", COverlayItemKvf::kImage, {".pngw", ".pnw", ".pgw"}},
+    LayerFile{".tif", COverlayItemKvf::kImage, {".tifw", ".tiw", ".tfw"}},
+    LayerFile{".tiff", COverlayItemKvf::kImage, {".tifw", ".tiw", ".tfw"}},
     LayerFile{".nds2", COverlayItemKvf::kGrid},
     LayerFile{".shp", COverlayItemKvf::kShape},
     LayerFile{".fvnwk", COverlayItemKvf::kRiver},
@@ -48,7 +48,7 @@ const LayerFile* LayerFileOf(std::string_view path) {
 std::optional<DataArea> PlaceOf(const std::string& image, const LayerFile& file, Host& host) {
   const std::string stem = image.substr(0, image.size() - ExtensionOf(image).size());
   for (const std::string_view extension : file.places)
-    if (const std::string reference = stem + std::string(extension); FileExists(reference))
+    if (const std::string reference = stem + std::string(extension); !extension.empty() && FileExists(reference))
       return ReadGeoReference(reference, image, host);
   return file.extension.starts_with(".tif") ? ReadGeoReference(image, image, host) : std::nullopt;
 }

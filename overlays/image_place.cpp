@@ -21,7 +21,9 @@ namespace tervane {
 namespace {
 
 constexpr std::array<std::string_view, 5> kParameterFiles{".bmpw", ".jpgw", ".gifw", ".pngw", ".tifw"};
-constexpr std::array<std::string_view, 5> kWorldFiles{".bpw", ".jpw", ".giw", ".pnw", ".tiw"};
+/// The last four are what other programs call them.
+constexpr std::array<std::string_view, 9> kWorldFiles{".bpw", ".jpw", ".giw", ".pnw", ".tiw",
+                                                      ".jgw", ".gfw", ".pgw", ".tfw"};
 constexpr std::array<std::string_view, 2> kOwnPlace{".tif", ".tiff"};
 
 /// The six numbers of a world file; why not, where it has fewer or others.

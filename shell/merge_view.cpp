@@ -78,6 +78,7 @@ MergeView::MergeView(MergeFiles files, Host& host)
 QString MergeView::Title() const { return tr("Merge of %1 and %2").arg(NameOf(files_.mine), NameOf(files_.theirs)); }
 
 void MergeView::Merge() {
+  stamps_ = Stamps();
   merge_ = MergeSetupFiles(files_.base, files_.mine, files_.theirs, files_.mine, choices_);
   Fill();
 }
@@ -89,6 +90,7 @@ void MergeView::Fill() {
                      .arg(merge_.result.takenFromThem)
                      .arg(conflicts.size());
   told += conflicts.empty() ? tr(".") : tr("; of each, one side is taken.");
+  if (!Problem().empty()) told = ToQt(Problem());
   if (merge_.comments > 0) told += " " + tr("Comments inside of the setups are not merged: %1.").arg(merge_.comments);
   summary_->setText(told);
   table_->setRowCount(static_cast<int>(conflicts.size()));
@@ -126,12 +128,12 @@ void MergeView::TakeAll(MergeSide side) {
 }
 
 bool MergeView::SaveTo(const std::string& path) {
-  const std::string before = merge_.text;
-  const std::size_t conflicts = Conflicts().size();
+  // What was taken last may still be due to be merged.
+  const bool isOther = Stamps() != stamps_;
   Merge();
   std::string problem = Problem();
-  if (problem.empty() && merge_.text != before && Conflicts().size() != conflicts)
-    problem = "A file has changed since it was merged: look at the conflicts again.";
+  if (problem.empty() && isOther)
+    problem = "A file has changed since it was merged. It was merged again: look at the conflicts, then save.";
   if (problem.empty()) problem = WriteFileAtomically(path, merge_.text).error;
   if (!problem.empty()) {
     host_.ShowMessage(problem, Host::Icon::Error);

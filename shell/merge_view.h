@@ -3,10 +3,12 @@
 #pragma once
 
 #include <QWidget>
+#include <array>
 #include <string>
 
 #include "access/file_merge.h"
 #include "core/host.h"
+#include "platform/files.h"
 
 class QLabel;
 class QTableWidget;
@@ -42,12 +44,16 @@ class MergeView : public QWidget {
  private:
   /// Merges anew, by what the user has taken.
   void Merge();
+  std::array<FileStamp, 3> Stamps() const {
+    return {StampOf(files_.base), StampOf(files_.mine), StampOf(files_.theirs)};
+  }
   void Fill();
   void AskAndSave();
 
   MergeFiles files_;
   Host& host_;
   MergeChoices choices_;
+  std::array<FileStamp, 3> stamps_;  ///< Of the files as they were merged.
   FileMerge merge_;
   QLabel* summary_;
   QTableWidget* table_;

@@ -103,9 +103,9 @@ SectionContent CGeoScene3DDlg::Surfaces() const {
     return Level{map.grids.empty() ? nullptr : map.grids.front().grid};
   };
   int number = 0;
-  const std::string layers = SurfaceFile();
-  for (const DataItem& item : DataFileFactsOf(layers)->items) {
-    const Level level = take(layers, ++number);
+  const std::string surfaces = SurfaceFile();
+  for (const DataItem& item : DataFileFactsOf(surfaces)->items) {
+    const Level level = take(surfaces, ++number);
     if (!level.grid) continue;
     if (number == 1)
       section.ground = level;
@@ -122,9 +122,11 @@ SectionContent CGeoScene3DDlg::Surfaces() const {
   }
   if (const std::string heads = ResultOf("_3DSZ.nds3"); Node().IsOfResults() && FileExists(heads)) {
     const auto& items = DataFileFactsOf(ResultOf("_CompLayers.nds2"))->items;
-    // As the scene has them: a layer's head bears the name of its surface.
-    for (std::size_t i = items.size(); i-- > 1;)
-      add("Head elevation: " + items[i].name, take(heads, 1, {0, static_cast<int>(i) - 1}));
+    const DataItem* head = DataFileFactsOf(heads)->Item(1);
+    // A layer's head bears the name of its surface; the file counts its layers from the bottom.
+    const int layers = head ? head->geometry.nz : 0;
+    for (int i = std::min(static_cast<int>(items.size()) - 1, layers); i > 0; --i)
+      add("Head elevation: " + items[static_cast<std::size_t>(i)].name, take(heads, 1, {0, layers - i}));
   }
   return section;
 }

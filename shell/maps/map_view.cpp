@@ -228,7 +228,9 @@ ReliefWindow* MapView::OpenRelief() {
   const auto ground = [view = QPointer<MapView>(this)]() -> SectionContent {
     return view && view->ground_ ? view->ground_() : SectionContent();
   };
-  const auto values = content_.grids.empty() ? nullptr : content_.grids.front().grid;
+  // A copy: it is sampled in another thread, while an editor may paint the grid.
+  std::shared_ptr<const CTvn2DOrthoRotatedGridData> values;
+  if (!content_.grids.empty()) values = std::make_shared<CTvn2DOrthoRotatedGridData>(*content_.grids.front().grid);
   auto drape = std::make_shared<ReliefDrape>();
   const QImage picture = canvas_->AreaPicture(*area, DrapePixels(*area)).convertToFormat(QImage::Format_ARGB32);
   drape->width = picture.width();

@@ -221,8 +221,10 @@ void ReliefCanvas::DrawHeights(QPainter& painter) const {
     const auto seen = camera_.See(corner, height);
     return QPointF(seen.x - Theme::Get().Scaled(8), seen.y);
   };
-  const ShownUnit unit(quantity::kElevation, kMetre, &units_);
-  const double lowest = unit.Shown(heights->first), highest = unit.Shown(heights->second);
+  const ShownUnit length(quantity::kElevation, kMetre, &units_);
+  const bool isLength = !relief_->unit;
+  const auto shown = [&](double height) { return isLength ? length.Shown(height) : height; };
+  const double lowest = shown(heights->first), highest = shown(heights->second);
   const double pixels = std::abs(at(heights->first).y() - at(heights->second).y());
   const double rowHeight = painter.fontMetrics().height() * 1.6;
   if (pixels < rowHeight) return;
@@ -230,14 +232,14 @@ void ReliefCanvas::DrawHeights(QPainter& painter) const {
   painter.setPen(QPen(palette().color(QPalette::Text), 1));
   painter.drawLine(at(heights->first), at(heights->second));
   for (double height = std::ceil(lowest / step) * step; height <= highest; height += step) {
-    const QPointF tick = at(unit.Stored(height));
+    const QPointF tick = at(isLength ? length.Stored(height) : height);
     painter.drawLine(tick, tick - QPointF(Theme::Get().Scaled(4), 0));
     const QString text = QString::number(std::abs(height) < step / 2 ? 0 : height, 'g', 6);
     painter.drawText(QRectF(tick.x() - 206, tick.y() - rowHeight / 2, 200 - Theme::Get().Scaled(2), rowHeight),
                      Qt::AlignRight | Qt::AlignVCenter, text);
   }
   painter.drawText(QRectF(at(heights->second) + QPointF(-150, -1.6 * rowHeight), QSizeF(160, rowHeight)),
-                   Qt::AlignRight | Qt::AlignVCenter, ToQt(unit.Text()));
+                   Qt::AlignRight | Qt::AlignVCenter, ToQt(isLength ? length.Text() : *relief_->unit));
 }
 
 void ReliefCanvas::DrawNorth(QPainter& painter, QPointF at) const {
@@ -309,12 +311,15 @@ QString ReliefCanvas::TextAt(QPointF place) const {
   const std::size_t cell = picture_.cell[at], nx = static_cast<std::size_t>(relief_->raster.nx);
   const MapPoint world = GridTransform(relief_->raster)
                              .ToWorld({static_cast<double>(cell % nx) + 0.5, static_cast<double>(cell / nx) + 0.5});
-  const ShownUnit height(quantity::kElevation, kMetre, &units_), across(quantity::kMapCoordinate, kMetre, &units_);
+  const ShownUnit length(quantity::kElevation, kMetre, &units_), across(quantity::kMapCoordinate, kMetre, &units_);
+  const auto height = [&](float value) {
+    if (!relief_->unit) return length.Value(double{value});
+    return QString("%1 %2").arg(QString::number(double{value}, 'g', 6), ToQt(*relief_->unit)).trimmed();
+  };
   QString text = tr("%1  x %2, y %3").arg(ToQt(body.name), across.Value(world.x), across.Value(world.y));
-  if (body.IsSurface()) return text + tr("  at %1").arg(height.Value(double{body.top[cell]}));
+  if (body.IsSurface()) return text + tr("  at %1").arg(height(body.top[cell]));
   return text + tr("  from %1 to %2, %3 thick")
-                    .arg(height.Value(double{body.top[cell]}), height.Value(double{body.bottom[cell]}),
-                         height.Value(double{body.top[cell]} - double{body.bottom[cell]}));
+                    .arg(height(body.top[cell]), height(body.bottom[cell]), height(body.top[cell] - body.bottom[cell]));
 }
 
 void ReliefCanvas::resizeEvent(QResizeEvent* /*event*/) {

@@ -7,6 +7,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "platform/units.h"
+
 namespace tervane {
 namespace {
 
@@ -52,6 +54,24 @@ TEST(ReliefContentTest, WhatHasNoGroundOrNoPlaceIsTold) {
   SectionContent flat;
   flat.ground = Level{nullptr, 3.0};
   EXPECT_EQ(ReliefOf(flat, relief), "All levels are the same everywhere.");
+}
+
+TEST(ReliefContentTest, ValuesThatAreLengthsAreMetresAndOthersKeepTheirUnit) {
+  const auto make = [](int unit, int itemType) {
+    CTvn2DOrthoRotatedGridData grid;
+    EXPECT_EQ(grid.TakeValues({2, 1, 10, 0, 0, 0, {}}, {100, 200}, kUsualDeleteValue, unit, itemType), "");
+    Relief relief;
+    EXPECT_EQ(ReliefOfValues(grid, relief), "");
+    return relief;
+  };
+  constexpr int kFoot = 1003, kElevationItem = 100180, kRainItem = 100431;
+  const Relief ground = make(kFoot, kElevationItem);
+  EXPECT_NEAR(ground.bodies.front().top[1], 60.96, 0.001);
+  EXPECT_FALSE(ground.unit);
+  const int rate = BaseUnit(*FindItemType(kRainItem)).key;
+  const Relief rain = make(rate, kRainItem);
+  EXPECT_EQ(rain.bodies.front().top[1], 200);
+  EXPECT_EQ(rain.unit, std::string(FindUnit(rate)->abbreviation));
 }
 
 TEST(ReliefContentTest, FineGridsAreSampled) {

@@ -55,6 +55,13 @@ TEST(DroppedLayer, AnImageLiesWhereTheFileBesideItTells) {
     return std::array{image->BMP_X0, image->BMP_Y0, image->BMP_X1, image->BMP_Y1};
   };
   EXPECT_EQ(corners("map.png"), (std::array{1.0, 2.0, 3.0, 4.0}));
+  // As other programs call it. The size of the image is needed: here 4 x 2 pixels, of a kind that its bytes tell.
+  folder.Write("photo.pgw", "10\n0\n0\n-10\n5\n45\n");
+  std::string image("BM\x4e\0\0\0\0\0\0\0\x36\0\0\0\x28\0\0\0\x04\0\0\0\x02\0\0\0\x01\0\x18\0\0\0\0\0\x18\0\0\0", 38);
+  image.resize(54, '\0');
+  image.resize(78, '\x7f');
+  folder.Write("photo.png", image);
+  EXPECT_EQ(corners("photo.png")[0], 0);
   const Envelope domain = document.Root().Important(kDomain)->GetEnvelope();
   EXPECT_EQ(corners("other.png"), (std::array{domain.xMin, domain.yMin, domain.xMax, domain.yMax}));
 }

@@ -41,8 +41,8 @@ try() { # try ROOT: the programs as they stand below it
 }
 try "$work/root"
 [ -e root/usr/include/tervane.h ] || fail "the header for C"
-if [ -d root/usr/lib/python3 ] && python3 -c 'import numpy' 2>/dev/null; then
-  PYTHONPATH="$(ls -d root/usr/lib/python3*/dist-packages)" python3 -c '
+if compgen -G "$build/python/tervane/_tervane*" >/dev/null; then
+  PYTHONPATH="$PWD/root/usr/lib/python3/dist-packages" /usr/bin/python3 -c '
 import sys, tervane
 setup = tervane.open(sys.argv[1])
 assert setup.validate() is not None' "$source/examples/default.tvd" || fail "the module for Python"

@@ -48,6 +48,21 @@ TEST(MergeView, TheChosenSideOfAConflictIsSavedAndTheSetupIsReadAnew) {
   EXPECT_EQ(setup.Value("SimSpec/SimTitle:Description"), "new") << "what only they have changed";
 }
 
+TEST(MergeView, AFileThatHasChangedIsMergedAgainBeforeItIsSaved) {
+  OpenedSetup setup(Titled("mine", "old"));
+  const std::string base = setup.Folder().Write("base.tvd", test::SetupText(14, Titled("first", "old")));
+  const std::string theirs = setup.Folder().Write("theirs.tvd", test::SetupText(14, Titled("theirs", "new")));
+  NobodyToAsk host;
+  MergeView view({base, setup.Frame().Session().Path(), theirs}, host);
+  setup.Folder().Write("theirs.tvd", test::SetupText(14, Titled("other theirs", "newer")));
+  const std::string out = setup.Folder().File("merged.tvd");
+  EXPECT_FALSE(view.SaveTo(out));
+  EXPECT_FALSE(FileExists(out));
+  EXPECT_EQ(view.Conflicts().front().theirs, "\"other theirs\"");
+  EXPECT_TRUE(view.SaveTo(out));
+  EXPECT_THAT(test::ReadFile(out), testing::HasSubstr("\"newer\""));
+}
+
 TEST(MergeView, WhatCannotBeMergedIsToldAndLeavesEverything) {
   OpenedSetup setup(Titled("mine", "old"));
   const std::string old = setup.Folder().Write("old.tvd", test::SetupText(10, Titled("first", "old")));
