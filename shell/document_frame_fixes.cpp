@@ -63,7 +63,8 @@ void DocumentFrame::OfferFixesOnPage() {
     CYbSEKvfBase* node = NodeOf(serial);
     if (!node) return;
     const SetupFinding found = asFound(*node, finding);
-    const auto kinds = QuickFixes(session_->Document()).KindsFor(*node, found);
+    const QuickFixes fixes(session_->Document());
+    const auto kinds = fixes.KindsFor(*node, found);
     if (!kinds.empty()) Fix(ToQt(std::string(kinds.front()->name)), {found});
   });
 }

@@ -149,8 +149,9 @@ TEST(SetupKeys, TakeValuesOfProgramsWhereNothingIsLost) {
 TEST(SetupKeys, OfAnOldFileAreTakenToo) {
   CFlowModelDoc document;
   ASSERT_TRUE(document.OpenText(test::SetupText(3, ""), "old.tvd")) << document.Error();
+  SetupKeys reading(document);
   for (CYbSEKvfBase* node : NodesOf(document))
-    for (const KvfNode* key : SetupKeys(document).KeysOf(*node))
+    for (const KvfNode* key : reading.KeysOf(*node))
       if (key->count == 1 && key->params[0].type == KvfType::Float) {
         const PlainValue value = 0.5;
         const std::string problem = SetupKeys(document).Set(*node, {std::string(key->Name()), 1}, {&value, 1});
