@@ -66,22 +66,29 @@ class Handles {
 Handles<SetupObject>& Setups();
 Handles<ClimateObject>& Climates();
 
+/// Lets other threads use an object again.
+struct FreeAtEnd {
+  std::atomic<bool>& isInUse;
+  ~FreeAtEnd() { isInUse = false; }
+};
+
 /// Runs an operation, one of all threads at a time, and turns what it throws into a result.
 tervane_result Call(const std::function<void()>& operation);
 
 /// The same with the object of a handle, for which only this thread may use it.
 template <class Object>
 tervane_result CallWith(Handles<Object>& handles, std::uint64_t handle, const std::function<void(Object&)>& operation) {
-  const std::shared_ptr<Object> object = handles.Find(handle);
+  std::shared_ptr<Object> object = handles.Find(handle);
   // What waits for the others must not wait for one that uses this object.
   const bool isFree = object && !object->isInUse.exchange(true);
-  const tervane_result result = Call([&] {
-    if (!object) Refuse(TERVANE_NO_HANDLE, "the handle was closed, or is none of this kind");
+  return Call([&] {
+    // The last one that holds an object destroys it, which other threads must wait for too.
+    const std::shared_ptr<Object> held = std::move(object);
+    if (!held) Refuse(TERVANE_NO_HANDLE, "the handle was closed, or is none of this kind");
     if (!isFree) Refuse(TERVANE_BUSY, "another thread uses it");
-    operation(*object);
+    const FreeAtEnd free{held->isInUse};
+    operation(*held);
   });
-  if (isFree) object->isInUse = false;
-  return result;
 }
 inline tervane_result CallWith(tervane_setup setup, const std::function<void(SetupObject&)>& operation) {
   return CallWith<SetupObject>(Setups(), setup, operation);

@@ -53,12 +53,6 @@ CYbSEKvfBase& ItemAt(CYbSEKvfBase& owner, int number) {
   return *item;
 }
 
-/// Lets other threads use an object again.
-struct FreeAtEnd {
-  std::atomic<bool>& isInUse;
-  ~FreeAtEnd() { isInUse = false; }
-};
-
 }  // namespace
 
 }  // namespace tervane::capi
@@ -160,10 +154,20 @@ tervane_result tervane_item_count(tervane_setup setup, const char* path, int* co
 tervane_result tervane_insert_item(tervane_setup setup, const char* path, int number, char* item, size_t size,
                                    size_t* length) {
   return CallWith(setup, [&](SetupObject& object) {
+    CYbSEKvfBase& owner = NodeAt(object, path);
+    if (number < 1) Refuse(TERVANE_ARGUMENT, fmt::format("{}: items are counted from 1: {} is none", path, number));
     std::string problem;
-    const CYbSEKvfBase* made = object.setup.InsertItem(NodeAt(object, path), number, nullptr, problem);
+    CYbSEKvfBase* made = object.setup.InsertItem(owner, number, nullptr, problem);
     if (!made) Refuse(TERVANE_REFUSED, problem);
-    if (item) Give(PathOf(*made), item, size, length);
+    if (!item) return;
+    try {
+      Give(PathOf(*made), item, size, length);
+    } catch (...) {
+      // What is told as not done must not be done.
+      ItemOwner(&owner).Remove(*made);
+      object.setup.Keys().Forget();
+      throw;
+    }
   });
 }
 
@@ -208,7 +212,11 @@ tervane_result tervane_validate(tervane_setup setup, tervane_finding_sink sink, 
 }
 
 tervane_result tervane_diff(tervane_setup from, tervane_setup to, tervane_difference_sink sink, void* context) {
-  std::vector<SetupDifference> differences;
+  struct Told {
+    std::string place;
+    SetupDifference difference;
+  };
+  std::vector<Told> told;
   const tervane_result result = CallWith(from, [&](SetupObject& before) {
     Need({reinterpret_cast<const void*>(sink)});
     const std::shared_ptr<SetupObject> after = Setups().Find(to);
@@ -216,13 +224,14 @@ tervane_result tervane_diff(tervane_setup from, tervane_setup to, tervane_differ
     if (after.get() == &before) return;
     if (after->isInUse.exchange(true)) Refuse(TERVANE_BUSY, "another thread uses the second setup");
     const FreeAtEnd free{after->isInUse};
-    differences = CompareDocuments(before.setup.Document(), after->setup.Document());
+    for (SetupDifference& difference : CompareDocuments(before.setup.Document(), after->setup.Document())) {
+      std::string place =
+          difference.key.empty() ? difference.path : fmt::format("{}:{}", difference.path, difference.key);
+      told.push_back({std::move(place), std::move(difference)});
+    }
   });
-  for (const SetupDifference& difference : differences) {
-    const std::string place =
-        difference.key.empty() ? difference.path : fmt::format("{}:{}", difference.path, difference.key);
+  for (const auto& [place, difference] : told)
     sink(place.c_str(), difference.from.c_str(), difference.to.c_str(), context);
-  }
   return result;
 }
 

@@ -38,7 +38,7 @@ typedef enum tervane_result {
   TERVANE_NOT_THERE = 4, /**< The setup has no such place, key, item or value. */
   TERVANE_REFUSED = 5,   /**< The key does not take the value, or the unit does not fit. */
   TERVANE_TOO_SMALL = 6, /**< The buffer is too small: `length` tells what is needed. */
-  TERVANE_ARGUMENT = 7,  /**< A null where none may be. */
+  TERVANE_ARGUMENT = 7,  /**< A null where none may be, or a number that counts nothing. */
   TERVANE_NO_MEMORY = 8
 } tervane_result;
 
@@ -82,8 +82,8 @@ TERVANE_API tervane_result tervane_set_number(tervane_setup setup, const char* p
 
 /** How many items a list, or node with zones, has. */
 TERVANE_API tervane_result tervane_item_count(tervane_setup setup, const char* path, int* count);
-/** Makes an item in front of that number; behind all others where there is none. `item`, which may be null, gets the
- *  path of the new item, as texts do. */
+/** Makes an item in front of that number, from 1; behind all others where there is none. `item`, which may be null,
+ * gets the path of the new item, as texts do; where it is too small nothing is made. */
 TERVANE_API tervane_result tervane_insert_item(tervane_setup setup, const char* path, int number, char* item,
                                                size_t size, size_t* length);
 TERVANE_API tervane_result tervane_delete_item(tervane_setup setup, const char* path, int number);

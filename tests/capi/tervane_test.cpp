@@ -196,5 +196,49 @@ TEST(CInterface, ManyThreadsHaveSetupsOfTheirOwn) {
   EXPECT_EQ(done, 200);
 }
 
+// What the last thread lets go is destroyed while others read: nothing of it may be shared unguarded.
+TEST(CInterface, SetupsAreClosedWhileOthersAreReadAndUsed) {
+  const test::TempFolder folder;
+  const std::string path = folder.Write("a.tvd", test::SetupText(14, ""));
+  std::atomic<int> done = 0;
+  std::atomic<tervane_setup> shared = 0;
+  std::vector<std::thread> threads;
+  for (int t = 0; t < 4; ++t)
+    threads.emplace_back([&] {
+      for (int i = 0; i < 25; ++i) {
+        tervane_setup setup = 0;
+        tervane_climate climate = 0;
+        done += tervane_open(path.c_str(), &setup) == TERVANE_OK;
+        done += tervane_climate_open(path.c_str(), &climate) == TERVANE_OK;
+        shared = setup;
+        int count = 0;
+        // Of another thread, perhaps just when that one closes it.
+        const tervane_result other = tervane_item_count(shared, "Species", &count);
+        done += other == TERVANE_OK || other == TERVANE_BUSY || other == TERVANE_NO_HANDLE;
+        tervane_result closed = TERVANE_BUSY;
+        while (closed == TERVANE_BUSY) closed = tervane_close(setup);
+        done += closed == TERVANE_OK;
+        done += tervane_climate_close(climate) == TERVANE_OK;
+      }
+    });
+  for (std::thread& thread : threads) thread.join();
+  EXPECT_EQ(done, 4 * 25 * 5);
+}
+
+TEST(CInterface, AnItemThatIsToldAsNotMadeIsNotMade) {
+  const Opened setup;
+  char small[3] = "";
+  std::size_t length = 0;
+  int count = -1;
+  EXPECT_EQ(tervane_insert_item(setup.handle, "Species", 1, small, sizeof small, &length), TERVANE_TOO_SMALL);
+  EXPECT_GT(length, sizeof small);
+  for (const int number : {0, -1}) {
+    EXPECT_EQ(tervane_insert_item(setup.handle, "Species", number, nullptr, 0, nullptr), TERVANE_ARGUMENT);
+    EXPECT_THAT(tervane_last_error(), HasSubstr("counted from 1"));
+  }
+  EXPECT_EQ(tervane_item_count(setup.handle, "Species", &count), TERVANE_OK);
+  EXPECT_EQ(count, 0);
+}
+
 }  // namespace
 }  // namespace tervane::capi_test
