@@ -45,9 +45,8 @@ bool OpenSetup::CopyTo(OpenSetup& copy, std::string& problem) const {
   const std::string& folder = Root().SetupFolder();
   if (!Document().BuildText(folder, text, problem)) return false;
   auto document = std::make_unique<CFlowModelDoc>();
-  // The path stands for the folder from which names of files start.
-  const std::string& path = Document().PathName();
-  if (!document->OpenText(text, path.empty() ? "copy.tvd" : path)) {
+  // The path stands for the folder from which names of files start; there is none before the first save.
+  if (!document->OpenText(text, Document().PathName())) {
     problem = document->Error();
     return false;
   }

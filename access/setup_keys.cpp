@@ -104,8 +104,9 @@ constexpr std::string_view kUsedKey = "IsDataUsedInSetup", kTouchedKey = "Touche
 }  // namespace
 
 const SetupKeys::Parts& SetupKeys::Written(CYbSEKvfBase& node) {
+  // Only for a further node: what was given of those that are kept may still be in use.
   const bool isFull = kept_ && kept_->nodes.Size() + kept_->texts.Size() > kMostKept;
-  if (keptRevision_ != revision_ || isFull || !kept_) {
+  if (keptRevision_ != revision_ || (isFull && !written_.contains(node.Serial())) || !kept_) {
     written_.clear();
     kept_ = NewScratch(document_);
     keptRevision_ = revision_;

@@ -38,7 +38,7 @@ bool CYbSEDocument::OnOpenDocument(const std::string& path) {
 bool CYbSEDocument::OpenText(std::string_view text, const std::string& path) {
   KvfFile* file = kvfCreate();
   file->path = path;
-  file->folder = FolderOf(AbsoluteFromHere(path));
+  if (!path.empty()) file->folder = FolderOf(AbsoluteFromHere(path));
   if (!ParseKvf(FileContent::Of(text), *file)) {
     error_ = fmt::format("{}:{}", path, file->syntaxError.message);
     kvfClose(&file);

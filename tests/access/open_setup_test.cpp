@@ -93,6 +93,18 @@ TEST(OpenSetup, ACopyIsAlikeAndGoesItsOwnWay) {
   EXPECT_TRUE(copy.Save(folder.File("b.tvd"))) << copy.Error();
 }
 
+TEST(OpenSetup, ACopyOfWhatWasNeverSavedIsBoundToNoFolder) {
+  const test::TempFolder folder;
+  OpenSetup setup, copy;
+  EXPECT_EQ(setup.Keys().Set(At(setup, "Topography/NDS_2D_DATA_FILE"), {"FILE_NAME", 1}, "dem.nds2"), "");
+  std::string problem;
+  ASSERT_TRUE(setup.CopyTo(copy, problem)) << problem;
+  EXPECT_EQ(copy.Root().SetupFolder(), "");
+  ASSERT_TRUE(copy.Save(folder.File("b.tvd"))) << copy.Error();
+  CYbSEKvfBase& file = At(copy, "Topography/NDS_2D_DATA_FILE");
+  EXPECT_EQ(dynamic_cast<DataFileNode&>(file).File.Absolute(), folder.File("dem.nds2"));
+}
+
 TEST(OpenSetup, NamesOfFilesStartFromTheFolderOfTheFirstSave) {
   const test::TempFolder folder;
   OpenSetup setup;

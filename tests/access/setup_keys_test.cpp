@@ -176,5 +176,19 @@ TEST(KeyUnits, ConvertBothWays) {
   }
 }
 
+TEST(SetupKeys, WhatWasGivenOfANodeOutlivesThatMuchIsKept) {
+  CFlowModelDoc document;
+  SetupKeys keys(document);
+  std::string problem;
+  CYbSEKvfBase* title = FindNodeOrTell(document.Root(), ParseSetupPath("SimSpec/SimTitle"), "", problem);
+  ASSERT_TRUE(title) << problem;
+  ASSERT_EQ(keys.Set(*title, {"Description", 1}, std::string(std::size_t{20} << 20, 'x')), "");
+  const KvfNode* key = keys.Find(*title, {"Title", 1}, problem);
+  ASSERT_TRUE(key) << problem;
+  EXPECT_TRUE(keys.InfoOf(*title, "Title"));
+  EXPECT_EQ(keys.Find(*title, {"Title", 1}, problem), key);
+  EXPECT_EQ(key->Name(), "Title");
+}
+
 }  // namespace
 }  // namespace tervane::setup_keys_test
