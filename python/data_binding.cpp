@@ -7,6 +7,7 @@
 #include <pybind11/stl.h>
 
 #include "data/datafile_writer.h"
+#include "document/setup_lock.h"
 #include "platform/key_number.h"
 #include "python/bindings.h"
 
@@ -132,6 +133,8 @@ py::dict StatisticsOfItem(const DataFile& file, int number) {
 void WriteFile(const std::string& path, const py::array_t<float, py::array::c_style | py::array::forcecast>& values,
                const py::dict& item, const py::array_t<std::int64_t, py::array::c_style | py::array::forcecast>& stamps,
                std::optional<std::int64_t> begin) {
+  if (const std::optional<LockHolder> holder = HolderOf(path))
+    Raise("SetupError", path + ": " + HolderSentence(*holder));
   NewDataFile content;
   content.dimensions = item["dimensions"].cast<int>();
   FileGeometry& place = content.geometry;

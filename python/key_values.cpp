@@ -161,6 +161,15 @@ void SetValue(OpenSetup& setup, CYbSEKvfBase& node, const PathStep& key, const p
     return;
   } else if (PyDate_Check(value.ptr())) {
     const bool hasTime = PyDateTime_Check(value.ptr());
+    const auto refuse = [&](const char* why) { Raise("ValueRefused", PathOf(node) + ":" + key.name + ": " + why); };
+    const Form form = FormOf(setup, node, keyword->Name());
+    if (form != Form::Date && form != Form::Day) refuse("it holds no date");
+    if (hasTime && !value.attr("tzinfo").is_none()) refuse("a date without a time zone was expected");
+    if (hasTime && (PyDateTime_DATE_GET_SECOND(value.ptr()) != 0 || PyDateTime_DATE_GET_MICROSECOND(value.ptr()) != 0))
+      refuse("a date in whole minutes was expected");
+    if (hasTime && form == Form::Day &&
+        (PyDateTime_DATE_GET_HOUR(value.ptr()) != 0 || PyDateTime_DATE_GET_MINUTE(value.ptr()) != 0))
+      refuse("a day without a time was expected");
     const int numbers[] = {PyDateTime_GET_YEAR(value.ptr()), PyDateTime_GET_MONTH(value.ptr()),
                            PyDateTime_GET_DAY(value.ptr()), hasTime ? PyDateTime_DATE_GET_HOUR(value.ptr()) : 0,
                            hasTime ? PyDateTime_DATE_GET_MINUTE(value.ptr()) : 0};

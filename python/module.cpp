@@ -30,6 +30,9 @@ py::dict Merge(const std::string& base, const std::string& mine, const std::stri
   SetupLock lock;
   if (lock.Take(out, SetupLock::Purpose::OneChange) == SetupLock::Outcome::Held)
     Raise("SetupError", out + ": " + lock.Reason());
+  // Into mine is what version control asks for.
+  if (out != mine && FileExists(out) && !IsSameFile(out, mine))
+    Raise("SetupError", out + ": it exists; choose another name");
   const FileMerge merge = MergeSetupFiles(base, mine, theirs, out);
   RaiseProblem(merge.result.problem);
   if (const FileResult written = WriteFileAtomically(out, merge.text); !written.Ok())

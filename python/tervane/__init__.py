@@ -81,7 +81,8 @@ def merge(
     theirs: str | os.PathLike[str],
     out: str | os.PathLike[str],
 ) -> Merge:
-    """Puts two setup files together that were made from `base`, and writes `out`, in one step; it may be `mine`.
+    """Puts two setup files together that were made from `base`, and writes `out`, in one step; it may be `mine`,
+    else a new file: raises `SetupError` where there is another one.
 
     Where both have changed a thing in different ways, the merged setup has mine, and the result lists the conflict.
     """

@@ -4,9 +4,10 @@
 
 from __future__ import annotations
 
+import operator
 import os
 from datetime import datetime, timedelta
-from typing import TYPE_CHECKING, Any, NamedTuple
+from typing import TYPE_CHECKING, Any, NamedTuple, SupportsIndex
 
 from . import _tervane
 from ._errors import KeyNotFound
@@ -102,7 +103,7 @@ class DataFile:
     def values(
         self,
         item: int | str = 0,
-        steps: int | slice | None = None,
+        steps: SupportsIndex | slice | None = None,
         layer: int | None = None,
         unit: str | None = None,
     ) -> Any:
@@ -115,19 +116,21 @@ class DataFile:
         """
         number = self._number(item)
         count = len(self) if self.items[number - 1].has_time else 1
-        if isinstance(steps, int):
-            if not -count <= steps < count:
-                raise IndexError(f"{self.path}: there is no step {steps}: it has {count}")
-            first, length, stride = steps % count, 1, 1
-        else:
-            first, stop, stride = (steps or slice(None)).indices(count)
+        is_one = steps is not None and not isinstance(steps, slice)
+        if steps is None or isinstance(steps, slice):
+            first, stop, stride = (slice(None) if steps is None else steps).indices(count)
             if stride < 1:
                 raise ValueError("steps are read forward")
             length = max(stop - first, 0)
+        else:
+            step = operator.index(steps)
+            if not -count <= step < count:
+                raise IndexError(f"{self.path}: there is no step {step}: it has {count}")
+            first, length, stride = step % count, 1, 1
         values = self._handle.read(number, first if length else 0, length, layer, unit)
         if stride > 1:
             values = values[::stride]
-        if isinstance(steps, int):
+        if is_one:
             values = values[0]
         if not self.items[number - 1].has_codes or unit is not None:
             return values
@@ -141,23 +144,37 @@ class DataFile:
         """Smallest and largest value of an item, in the unit of the file; as it stores them, else of all values."""
         return self._handle.statistics(self._number(item))
 
+    def _names(self) -> list[str]:
+        """Of the items; of like ones the second is "name (2)"."""
+        names: list[str] = []
+        for item in self.items:
+            name, number = item.name, 1
+            while name in names:
+                number += 1
+                name = f"{item.name} ({number})"
+            names.append(name)
+        return names
+
     def to_pandas(self) -> pandas.DataFrame:
-        """The time series of the file, a column for each, over their times. Needs pandas."""
+        """The time series of the file, a column for each, over their times; of like names the second is "name (2)".
+        Needs pandas."""
         import pandas
 
-        series = {item.name: self.values(i) for i, item in enumerate(self.items) if item.dimensions == 0}
+        names = self._names()
+        series = {names[i]: self.values(i) for i, item in enumerate(self.items) if item.dimensions == 0}
         if not series:
             raise ValueError(f"{self.path}: it holds no time series")
         return pandas.DataFrame(series, index=pandas.DatetimeIndex(self.times, name="time"))
 
     def to_xarray(self) -> xarray.Dataset:
         """All items with their times and the centres of their cells; of rotated grids in the grid's own directions.
-        Needs xarray."""
+        Of like names the second is "name (2)". Needs xarray."""
         import numpy
         import xarray
 
         times = self.times
         variables = {}
+        names = self._names()
         for i, item in enumerate(self.items):
             axes = ["time", "z", "y", "x"] if item.dimensions == 3 else ["time", "y", "x"]
             axes = axes if item.dimensions >= 2 else ["time", "x"][: item.dimensions + 1]
@@ -172,7 +189,7 @@ class DataFile:
             if not item.has_time:
                 values, axes = values[0], axes[1:]
             attributes = {"item_type": item.item_type, "rotation": item.rotation}
-            variables[item.name] = xarray.DataArray(values, coordinates, axes, item.name, attributes)
+            variables[names[i]] = xarray.DataArray(values, coordinates, axes, names[i], attributes)
         return xarray.Dataset(variables)
 
     def __repr__(self) -> str:
@@ -201,7 +218,8 @@ def write_data_file(
 ) -> None:
     """Writes a data file of one item, in one step. The values are an array (time, z, y, x), without a time axis where
     `times` is None, and with the axes that the extension tells: (time) for .nds0, (time, x) for .nds1, (time, y, x) for
-    .nds2. Row 0 is the south; what is NaN or masked is missing.
+    .nds2. Row 0 is the south; what is NaN or masked is missing. Raises `SetupError`, and the old file stands, where an
+    editor has it open.
 
     Args:
         quantity: its name or code: "Elevation".

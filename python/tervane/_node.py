@@ -248,9 +248,18 @@ class NodeList(MutableSequence[Node]):
                 raise
 
     def add(self, value: Node | Mapping[str, Any] | None = None, **keys: Any) -> Node:
-        """Appends an item, and gives it: add(Name="Nitrate")."""
-        self.append({**value, **keys} if isinstance(value, Mapping) else value if value is not None else keys)
-        return self[-1]
+        """Appends an item, and gives it: add(Name="Nitrate"). The keys hold over those of `value`."""
+        if value is None or isinstance(value, Mapping):
+            self.append({**(value or {}), **keys})
+            return self[-1]
+        self.append(value)
+        item = self[-1]
+        try:
+            item.update(keys)
+        except Exception:
+            del self[-1]
+            raise
+        return item
 
     def append(self, value: Node | Mapping[str, Any] | None = None) -> None:
         """Appends an item."""

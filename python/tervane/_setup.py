@@ -26,6 +26,8 @@ def _seconds(when: date | None) -> int | None:
     """Since 1970, of a date without a zone."""
     if when is None:
         return None
+    if isinstance(when, datetime) and when.tzinfo is not None:
+        raise ValueError(f"{when} has a time zone: a date without one was expected")
     moment = when if isinstance(when, datetime) else datetime(when.year, when.month, when.day)
     return int(moment.replace(tzinfo=timezone.utc).timestamp())
 

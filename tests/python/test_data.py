@@ -25,6 +25,8 @@ def test_a_grid_is_given_back_as_it_was_written(tmp_path):
     numpy.testing.assert_array_equal(read, values)
     numpy.testing.assert_array_equal(file.times, numpy.array(DAYS, dtype="datetime64[s]"))
     numpy.testing.assert_array_equal(file.values(steps=-1), values[3])
+    numpy.testing.assert_array_equal(file.values(steps=numpy.int64(0)), values[0])
+    numpy.testing.assert_array_equal(file.values(steps=0), values[0])
     numpy.testing.assert_array_equal(file.values("Elevation", steps=slice(1, 4, 2)), values[1:4:2])
     numpy.testing.assert_allclose(file.values(unit="km"), values / 1000, rtol=1e-6)
     assert file.values(steps=slice(2, 2)).shape == (0, 3, 5)
@@ -76,6 +78,23 @@ def test_what_is_not_there_is_told(tmp_path, call, error):
     with pytest.raises(error):
         call(file)
     assert file.values().shape == (1, 2, 2)
+
+
+def test_what_an_editor_holds_is_not_written_over(tmp_path):
+    path = tmp_path / "a.nds2"
+    tervane.write_data_file(path, numpy.ones((2, 2)), "Elevation")
+    (tmp_path / ".a.nds2.lock").write_text("somebody")
+    with pytest.raises(tervane.SetupError, match="may have it open"):
+        tervane.write_data_file(path, numpy.zeros((2, 2)), "Elevation")
+    assert tervane.open_data_file(path).values().min() == 1
+
+
+def test_items_of_one_name_have_names_of_their_own(tmp_path):
+    tervane.write_data_file(tmp_path / "a.nds2", numpy.ones((2, 2)), "Elevation")
+    file = tervane.open_data_file(tmp_path / "a.nds2")
+    [item] = file.items
+    file.items = [item._replace(name=name) for name in ("a", "a", "a (2)", "a", "b")]
+    assert file._names() == ["a", "a (2)", "a (2) (2)", "a (3)", "b"]
 
 
 def test_threads_read_one_file(tmp_path):

@@ -40,6 +40,30 @@ def test_a_value_is_given_back_as_it_was_set(setup, tmp_path, path, value, expec
     assert again.path == str(tmp_path / "a.tvd") and again.diff(setup) == []
 
 
+PERIOD = "SimSpec/SimulationPeriod:SIMSTART"
+
+
+@pytest.mark.parametrize(
+    "path, value, text",
+    [
+        ("SimSpec:ModelType", datetime.datetime(2003, 2, 1), "holds no date"),
+        (STEP, datetime.date(2003, 2, 1), "holds no date"),
+        (PERIOD, datetime.datetime(2003, 2, 1, 0, 0, 30), "whole minutes"),
+        (PERIOD, datetime.datetime(2003, 2, 1, tzinfo=datetime.timezone.utc), "time zone"),
+    ],
+)
+def test_a_date_that_would_not_be_kept_is_refused(setup, path, value, text):
+    before = setup.text()
+    with pytest.raises(tervane.ValueRefused, match=text):
+        setup[path] = value
+    assert setup.text() == before
+
+
+def test_a_date_of_a_zone_is_none_of_the_simulation(setup):
+    with pytest.raises(ValueError, match="time zone"):
+        setup.statistics(start=datetime.datetime(2003, 2, 1, tzinfo=datetime.timezone.utc))
+
+
 def test_numbers_have_units(setup):
     setup.set(STEP, 0.5, unit="days")
     assert (setup[STEP], setup.get(STEP, unit="minutes")) == (12.0, 720.0)
@@ -111,6 +135,10 @@ def test_a_list_is_a_sequence_of_nodes(setup):
     extra.add(Name="p")
     extra.append(extra[0])
     assert [item["Name"] for item in extra] == ["p", "p"]
+    assert extra.add(extra[0], Name="q")["Name"] == "q"
+    with pytest.raises(tervane.KeyNotFound):
+        extra.add(extra[0], Nam="r")
+    assert [item["Name"] for item in extra] == ["p", "p", "q"]
     with pytest.raises(tervane.ValueRefused, match="another kind"):
         species.append(extra[0])
     with pytest.raises(TypeError):
@@ -187,6 +215,11 @@ def test_two_setups_are_merged(setup, tmp_path):
     assert conflict.key == "InitialTimeStep" and merge.taken == 1
     merged = tervane.open(tmp_path / "out.tvd")
     assert (merged[STEP], merged["SimSpec:ModelType"], merged["SimSpec/SimTitle:Title"]) == (1.0, 2, "mine")
+    theirs = (tmp_path / "theirs.tvd").read_bytes()
+    with pytest.raises(tervane.SetupError, match="exists"):
+        tervane.merge(*(tmp_path / f"{n}.tvd" for n in ("base", "mine", "theirs", "theirs")))
+    assert (tmp_path / "theirs.tvd").read_bytes() == theirs
+    assert tervane.merge(*(tmp_path / f"{n}.tvd" for n in ("base", "mine", "theirs", "mine"))).taken == 1
 
 
 def test_what_others_have_written_is_not_overrun(setup, tmp_path):
