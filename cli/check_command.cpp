@@ -1,6 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <algorithm>
+#include <optional>
 #include <unordered_map>
 #include <vector>
 
@@ -121,7 +122,11 @@ int CheckCommand(const CheckOptions& options, Streams streams) {
   std::string fixed;
   FixOptions fixes = options.fixes;
   fixes.each = options.each;
-  if (options.fix && !FixAndSave(document, file, fixes, options.json ? &fixed : nullptr, streams)) return kCouldNot;
+  // What is found is found in the file, which a dry run leaves as it is.
+  std::optional<CFlowModelDoc> trial;
+  if (options.fix && fixes.isDry && !OpenSetup(trial.emplace(), file, streams)) return kCouldNot;
+  if (options.fix && !FixAndSave(trial ? *trial : document, file, fixes, options.json ? &fixed : nullptr, streams))
+    return kCouldNot;
   const std::vector<SetupFinding> findings = FindingsOf(document);
   if (options.json)
     WriteJson(document, findings, fixed, streams.out);
@@ -136,6 +141,8 @@ void OfferCheckCommand(CommandOffers& offers) {
   auto options = std::make_shared<CheckOptions>();
   Command check = offers.Offer(
       "check", "List errors, warnings, notes and what the file holds that nothing reads", [offers, options] {
+        if (options->coverage && options->fix)
+          return Refuse(offers.Output(), "--coverage tells of the data and mends nothing: leave --fix out");
         return options->coverage ? CoverageCommand(options->file, options->json, offers.Output())
                                  : CheckCommand(*options, offers.Output());
       });

@@ -16,22 +16,31 @@ FileResult FilesByName::Search(const std::string& folder, const std::set<std::st
   alike_.clear();
   std::set<std::string> wanted;
   for (const std::string& name : names) wanted.insert(LowerCase(name));
-  std::error_code error;
-  fs::recursive_directory_iterator entry(NativePath(folder), fs::directory_options::skip_permission_denied, error);
-  if (error) return {folder + ": " + error.message(), {}};
-  while (entry != fs::recursive_directory_iterator()) {
-    if (progress.IsCancelled()) return {folder + ": " + kCancelled, {}};
-    const std::string name = TextOfPath(entry->path().filename());
-    std::string lower = LowerCase(name);
-    std::error_code ignored;
-    if (wanted.contains(lower) && entry->is_regular_file(ignored)) {
+  std::vector<fs::path> folders{NativePath(folder)};
+  for (bool isFirst = true; !folders.empty(); isFirst = false) {
+    const fs::path here = std::move(folders.back());
+    folders.pop_back();
+    std::error_code error;
+    // The folder itself must be readable.
+    const auto options = isFirst ? fs::directory_options::none : fs::directory_options::skip_permission_denied;
+    for (fs::directory_iterator entry(here, options, error); !error && entry != fs::directory_iterator();
+         entry.increment(error)) {
+      if (progress.IsCancelled()) return {folder + ": " + kCancelled, {}};
+      std::error_code ignored;
+      if (entry->symlink_status(ignored).type() == fs::file_type::directory) {
+        folders.push_back(entry->path());
+        continue;
+      }
+      const std::string name = TextOfPath(entry->path().filename());
+      std::string lower = LowerCase(name);
+      if (!wanted.contains(lower) || !entry->is_regular_file(ignored)) continue;
       std::string path = TextOfPath(entry->path());
       if (names.contains(name)) exact_[name].push_back(path);
       alike_[std::move(lower)].push_back(std::move(path));
     }
-    entry.increment(error);
     // What vanishes while it is walked is not there.
-    if (error) break;
+    const bool isGone = error == std::errc::no_such_file_or_directory || error == std::errc::not_a_directory;
+    if (error && (isFirst || !isGone)) return {TextOfPath(here) + ": " + error.message(), {}};
   }
   for (auto* found : {&exact_, &alike_})
     for (auto& [name, paths] : *found) std::ranges::sort(paths);

@@ -17,7 +17,7 @@ class FilesByName {
  public:
   /// Looks for all names in one walk; names are the same in any case of ASCII letters, since setups come from systems
   /// that make no difference. Folders behind symbolic links, and folders that may not be read, are passed over. The
-  /// error tells when the folder itself cannot be read, or that the search was cancelled.
+  /// error tells which folder cannot be read, or that the search was cancelled.
   FileResult Search(const std::string& folder, const std::set<std::string>& names, ProgressPart progress = {});
 
   /// The files of a name in the order of their paths: those that are written exactly so, else those that differ in the

@@ -221,5 +221,26 @@ TEST_F(CheckFixes, WhatCannotBeDoneIsToldAndWritesNothing) {
   EXPECT_NE(ReadFile(file), text);
 }
 
+TEST_F(CheckFixes, ADryRunTellsWhatIsFoundInTheFile) {
+  folder.Write("a.tvd", SetupWithGauges({"gone/one.nds0"}));
+  WriteRain("data/one.nds0", 6);
+  const auto found = [](const test::CommandOutcome& outcome) {
+    rapidjson::Document told;
+    told.Parse(outcome.out.c_str());
+    return told["findings"].Size();
+  };
+  const test::CommandOutcome before = Tervane({"check", file, "--json"}), dry = Fix({"--dry-run", "--json"});
+  EXPECT_EQ(found(dry), found(before));
+  EXPECT_EQ(dry.status, before.status);
+  EXPECT_LT(found(Fix({"--json"})), found(before));
+}
+
+TEST_F(CheckFixes, CoverageMendsNothing) {
+  folder.Write("a.tvd", SetupWithGauges({}));
+  const test::CommandOutcome outcome = Fix({"--coverage"});
+  EXPECT_EQ(outcome.status, kCouldNot);
+  EXPECT_THAT(outcome.err, HasSubstr("leave --fix out"));
+}
+
 }  // namespace
 }  // namespace tervane::check_fixes_test
