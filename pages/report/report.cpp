@@ -208,7 +208,8 @@ void ReportRun(ReportContext& context, std::vector<ReportBlock>& blocks) {
                                     {"User", passport->user},
                                     {"Host", passport->host},
                                     {"Program", passport->program}})
-    if (!value.empty()) table.rows.push_back({name, context.dates.In(value)});
+    if (!value.empty())
+      table.rows.push_back({name, std::string_view(name).ends_with("(UTC)") ? context.dates.In(value) : value});
   blocks.push_back(std::move(table));
   const std::vector<InputChange> changes = ChangedInputs(*passport, true);
   ReportTable inputs{{"Input", "Size", "Hash", "Since"}, {}};

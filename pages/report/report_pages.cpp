@@ -101,7 +101,9 @@ class PageDifferences {
     const bool isFilled =
         control.kind == ControlKind::Text || control.kind == ControlKind::LongText || control.kind == ControlKind::File;
     if (!isFilled && !defaults_.Reset(control)) return;
-    values.rows.push_back({label.empty() ? "Choice" : label, dates_.In(*value),
+    // A date in the name of a file is no date of the model.
+    values.rows.push_back({label.empty() ? "Choice" : label,
+                           control.kind == ControlKind::File ? *value : dates_.In(*value),
                            isFilled ? "" : dates_.In(DefaultInWords(defaults_, control))});
   }
   void AddTable(const TableForm& table) {
@@ -122,7 +124,10 @@ class PageDifferences {
       auto& cells = told.rows.emplace_back();
       for (const int column : columns) {
         const std::string text = table.ShownCell(row, column);
-        cells.push_back(!isCheck(column) ? dates_.In(text) : text == "1" ? "yes" : text == "0" ? "no" : text);
+        if (isCheck(column))
+          cells.push_back(text == "1" ? "yes" : text == "0" ? "no" : text);
+        else
+          cells.push_back(table.Kind(row, column) == CellKind::File ? text : dates_.In(text));
       }
     }
     LeaveEmptyColumns(told);

@@ -3,7 +3,7 @@
 set -euo pipefail
 tervane="$1" make="$2"
 for tool in gdalinfo gdallocationinfo ncdump ncgen; do
-  command -v "$tool" >/dev/null || { echo "skipped: $tool is missing"; exit 0; }
+  command -v "$tool" >/dev/null || { echo "skipped: $tool is missing"; exit 77; }
 done
 folder="$(mktemp -d)"
 trap 'rm -rf "$folder"' EXIT
