@@ -183,11 +183,13 @@ TEST(SetupKeys, WhatWasGivenOfANodeOutlivesThatMuchIsKept) {
   CYbSEKvfBase* title = FindNodeOrTell(document.Root(), ParseSetupPath("SimSpec/SimTitle"), "", problem);
   ASSERT_TRUE(title) << problem;
   ASSERT_EQ(keys.Set(*title, {"Description", 1}, std::string(std::size_t{20} << 20, 'x')), "");
-  const KvfNode* key = keys.Find(*title, {"Title", 1}, problem);
-  ASSERT_TRUE(key) << problem;
+  ASSERT_TRUE(keys.Find(*title, {"Title", 1}, problem)) << problem;
+  // A change that these keys are not told of shows whether they were made anew.
+  ASSERT_EQ(SetupKeys(document).Set(*title, {"Title", 1}, "new"), "");
   EXPECT_TRUE(keys.InfoOf(*title, "Title"));
-  EXPECT_EQ(keys.Find(*title, {"Title", 1}, problem), key);
-  EXPECT_EQ(key->Name(), "Title");
+  EXPECT_EQ(keys.Find(*title, {"Title", 1}, problem)->params[0].Text(), "");
+  keys.Forget();
+  EXPECT_EQ(keys.Find(*title, {"Title", 1}, problem)->params[0].Text(), "new");
 }
 
 }  // namespace

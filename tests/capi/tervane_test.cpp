@@ -211,7 +211,10 @@ TEST(CInterface, SetupsAreClosedWhileOthersAreReadAndUsed) {
         done += tervane_open(path.c_str(), &setup) == TERVANE_OK;
         done += tervane_climate_open(path.c_str(), &climate) == TERVANE_OK;
         shared = setup;
+        char text[100];
         int count = 0;
+        // Of what is kept for reading there is more to destroy.
+        (void)tervane_get_text(setup, "SimSpec/SimTitle:Title", text, sizeof text, nullptr);
         // Of another thread, perhaps just when that one closes it.
         const tervane_result other = tervane_item_count(shared, "Species", &count);
         done += other == TERVANE_OK || other == TERVANE_BUSY || other == TERVANE_NO_HANDLE;

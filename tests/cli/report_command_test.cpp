@@ -53,6 +53,16 @@ TEST_F(ReportCommand, ValuesThatDifferStandWithUnitAndDefaultAndOthersDoNot) {
                           Not(HasSubstr("<h2 id=\"model\">")), Not(HasSubstr("<c>"))));
 }
 
+TEST_F(ReportCommand, NamesOfFilesAreNoDates) {
+  const std::string setup =
+      folder.Write("a.tvd", test::SetupText(14,
+                                            "section Topography {\nType = 1\nsection NDS_2D_DATA_FILE {\n"
+                                            "FILE_NAME = file \"dem of 2000-01-31.nds2\"\n}\n}\nsection SimSpec {\n"
+                                            "section SimTitle {\nDescription = \"Since 2000-01-31\"\n}\n}"));
+  const std::string page = Report({setup, "--sections", "values", "--dates", "de"});
+  EXPECT_THAT(page, AllOf(HasSubstr("dem of 2000-01-31.nds2"), HasSubstr("Since 31. Januar 2000")));
+}
+
 TEST_F(ReportCommand, RefusesWhatItCannotWriteAndLeavesTheFile) {
   folder.Write("report.html", "mine");
   folder.Write("logo.bmp", "x");
