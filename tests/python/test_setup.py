@@ -59,6 +59,14 @@ def test_a_date_that_would_not_be_kept_is_refused(setup, path, value, text):
     assert setup.text() == before
 
 
+def test_a_day_takes_no_time(setup):
+    crop = setup.node("LandUse/Vegetation/GLOBAL/VEG_PROP_FILES").items.add()
+    crop["STARTDATE"] = datetime.datetime(2003, 2, 1)
+    with pytest.raises(tervane.ValueRefused, match="without a time"):
+        crop["STARTDATE"] = datetime.datetime(2003, 2, 2, 5)
+    assert crop["STARTDATE"] == datetime.date(2003, 2, 1)
+
+
 def test_a_date_of_a_zone_is_none_of_the_simulation(setup):
     with pytest.raises(ValueError, match="time zone"):
         setup.statistics(start=datetime.datetime(2003, 2, 1, tzinfo=datetime.timezone.utc))
