@@ -58,6 +58,7 @@ std::vector<int> Chosen(int count, double from, double to, int every) {
 struct Mesh {
   std::vector<Corner> corners;
   std::vector<std::uint8_t> isThere;
+  std::vector<std::pair<float, float>> rows;  ///< From where to where on the screen, downwards, each row reaches.
 };
 
 /// A body as it is drawn: its surfaces on the chosen columns and rows.
@@ -65,6 +66,7 @@ struct DrawnBody {
   const ReliefBody* body = nullptr;
   std::uint16_t number = 0;
   Mesh top, bottom;
+  std::vector<std::uint8_t> cells;  ///< Whether the body is in the cell to the upper right of a place.
 };
 
 /// Rows of the picture that one thread draws.
@@ -96,14 +98,21 @@ class Stripe {
     }
   }
 
-  /// `drape` is null where the colour of the body is seen.
-  void Triangle(const Corner& a, const Corner& b, const Corner& c, std::uint32_t cell, const ReliefDrape* drape) {
+  /// Whether anything between these heights of the screen is in the stripe.
+  bool Reaches(float highest, float lowest) const {
+    return lowest >= static_cast<float>(from_) && highest <= static_cast<float>(to_);
+  }
+
+  /// `drape` is null where the colour of the body is seen. Of a body only what faces the one who looks is seen:
+  /// `facing` is the sign of the area of such a triangle on the screen, 0 for both sides.
+  void Triangle(const Corner& a, const Corner& b, const Corner& c, std::uint32_t cell, const ReliefDrape* drape,
+                float facing) {
     const float lowest = std::min({a.y, b.y, c.y}), highest = std::max({a.y, b.y, c.y});
     if (!(highest >= static_cast<float>(from_)) || !(lowest <= static_cast<float>(to_))) return;
     const float left = std::min({a.x, b.x, c.x}), right = std::max({a.x, b.x, c.x});
     if (!(right >= 0) || !(left <= static_cast<float>(picture_.width))) return;
     const float area = (b.x - a.x) * (c.y - a.y) - (c.x - a.x) * (b.y - a.y);
-    if (area == 0) return;
+    if (area == 0 || area * facing < 0) return;
     // The centre of a pixel decides.
     const int x0 = std::max(0, static_cast<int>(std::ceil(left - 0.5F)));
     const int x1 = std::min(picture_.width - 1, static_cast<int>(std::floor(right - 0.5F)));
@@ -233,12 +242,16 @@ class Drawer {
 
   void MakeBodies() {
     for (std::size_t i = 0; i < relief_.bodies.size(); ++i)
-      if (relief_.bodies[i].isShown) bodies_.push_back({&relief_.bodies[i], static_cast<std::uint16_t>(i), {}, {}});
+      if (relief_.bodies[i].isShown) bodies_.push_back({&relief_.bodies[i], static_cast<std::uint16_t>(i), {}, {}, {}});
     if (bodies_.empty()) return;
     Share(bodies_.size(), [&](std::size_t i) {
       DrawnBody& drawn = bodies_[i];
       drawn.top = MeshOf(drawn.body->top, *drawn.body);
       if (!drawn.body->IsSurface()) drawn.bottom = MeshOf(drawn.body->bottom, *drawn.body);
+      drawn.cells.assign(columns_.size() * rows_.size(), 0);
+      for (std::size_t row = 0; row + 1 < rows_.size(); ++row)
+        for (std::size_t column = 0; column + 1 < columns_.size(); ++column)
+          drawn.cells[At(column, row)] = IsIn(drawn, column, row) ? 1 : 0;
     });
   }
 
@@ -257,6 +270,7 @@ class Drawer {
     const int nx = relief_.raster.nx, ny = relief_.raster.ny;
     const double drapeX = body.drape ? static_cast<double>(body.drape->width) / nx : 0;
     const double drapeY = body.drape ? static_cast<double>(body.drape->height) / ny : 0;
+    mesh.rows.assign(rows_.size(), {kFarthest, -kFarthest});
     for (std::size_t row = 0; row < rows_.size(); ++row)
       for (std::size_t column = 0; column < columns_.size(); ++column) {
         const std::size_t place = At(column, row);
@@ -268,6 +282,7 @@ class Drawer {
         corner.x = at(&ReliefCamera::Seen::x, i, j, double{height});
         corner.y = at(&ReliefCamera::Seen::y, i, j, double{height});
         corner.depth = at(&ReliefCamera::Seen::depth, i, j, double{height});
+        mesh.rows[row] = {std::min(mesh.rows[row].first, corner.y), std::max(mesh.rows[row].second, corner.y)};
         corner.light = LightAt(heights, column, row);
         corner.u = static_cast<float>((i + 0.5) * drapeX);
         corner.v = static_cast<float>((ny - j - 0.5) * drapeY);
@@ -355,37 +370,49 @@ class Drawer {
     stripe.BeginBody(body);
     const ReliefDrape* drape = body.body->drape && body.body->drape->width > 0 ? body.body->drape.get() : nullptr;
     const std::size_t columns = columns_.size(), rows = rows_.size();
-    std::vector<std::uint8_t> below(columns, 0), here(columns, 0);  // Whether the body is in the cells of a row.
+    const bool isSurface = body.body->IsSurface();
     for (std::size_t row = 0; row < rows && !IsGivenUp(); ++row) {
-      std::swap(below, here);
-      for (std::size_t column = 0; column + 1 < columns; ++column)
-        here[column] = row + 1 < rows && IsIn(body, column, row) ? 1 : 0;
+      if (!IsInStripe(stripe, body, row)) continue;
       for (std::size_t column = 0; column < columns; ++column) {
-        const bool isIn = column + 1 < columns && here[column];
+        const bool isIn = body.cells[At(column, row)];
         if (isIn) {
           const auto cell = static_cast<std::uint32_t>(CellOf(column, row));
-          Cell(stripe, body.top, column, row, cell, drape);
-          if (!body.body->IsSurface()) Cell(stripe, body.bottom, column, row, cell, nullptr);
+          // On the screen, which counts downwards, what is seen from above goes round the other way.
+          Cell(stripe, body.top, column, row, cell, drape, isSurface ? 0.0F : -1.0F);
+          if (!isSurface) Cell(stripe, body.bottom, column, row, cell, nullptr, 1);
         }
-        if (body.body->IsSurface()) continue;
+        if (isSurface) continue;
         // Where the body ends there is a wall.
-        if (isIn != (column > 0 && here[column - 1])) Wall(stripe, body, {column, row}, {column, row + 1});
-        if (isIn != (column + 1 < columns && below[column])) Wall(stripe, body, {column, row}, {column + 1, row});
+        if (isIn != (column > 0 && body.cells[At(column - 1, row)]))
+          Wall(stripe, body, {column, row}, {column, row + 1});
+        if (isIn != (row > 0 && body.cells[At(column, row - 1)])) Wall(stripe, body, {column, row}, {column + 1, row});
       }
     }
     stripe.EndBody();
   }
 
-  static void Quad(Stripe& stripe, const std::array<Corner, 4>& corners, std::uint32_t cell, const ReliefDrape* drape) {
-    stripe.Triangle(corners[0], corners[1], corners[2], cell, drape);
-    stripe.Triangle(corners[0], corners[2], corners[3], cell, drape);
+  /// Whether something of a row of cells is in the stripe.
+  static bool IsInStripe(const Stripe& stripe, const DrawnBody& body, std::size_t row) {
+    float highest = kFarthest, lowest = -kFarthest;
+    for (const Mesh* mesh : {&body.top, &body.bottom})
+      for (std::size_t i = row; i < std::min(row + 2, mesh->rows.size()); ++i) {
+        highest = std::min(highest, mesh->rows[i].first);
+        lowest = std::max(lowest, mesh->rows[i].second);
+      }
+    return stripe.Reaches(highest, lowest);
+  }
+
+  static void Quad(Stripe& stripe, const std::array<Corner, 4>& corners, std::uint32_t cell, const ReliefDrape* drape,
+                   float facing) {
+    stripe.Triangle(corners[0], corners[1], corners[2], cell, drape, facing);
+    stripe.Triangle(corners[0], corners[2], corners[3], cell, drape, facing);
   }
   void Cell(Stripe& stripe, const Mesh& mesh, std::size_t column, std::size_t row, std::uint32_t cell,
-            const ReliefDrape* drape) const {
+            const ReliefDrape* drape, float facing) const {
     Quad(stripe,
          {mesh.corners[At(column, row)], mesh.corners[At(column + 1, row)], mesh.corners[At(column + 1, row + 1)],
           mesh.corners[At(column, row + 1)]},
-         cell, drape);
+         cell, drape, facing);
   }
 
   using Place = std::pair<std::size_t, std::size_t>;
@@ -395,7 +422,7 @@ class Drawer {
     // Walls of the two directions are told apart by their light, as the sides of a box.
     const float light = from.first == to.first ? 0.72F : 0.86F;
     for (Corner& corner : corners) corner.light = light;
-    Quad(stripe, corners, static_cast<std::uint32_t>(CellOf(from.first, from.second)), nullptr);
+    Quad(stripe, corners, static_cast<std::uint32_t>(CellOf(from.first, from.second)), nullptr, 0);
   }
 
   const Relief& relief_;
