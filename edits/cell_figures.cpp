@@ -15,6 +15,8 @@ namespace {
 /// A line one cell thick, row by row (Bresenham's, with whole runs of a row at a time).
 void ThinLine(const GridGeometry& grid, MapPoint from, MapPoint to, const FoundCells& found) {
   if (from.y > to.y) std::swap(from, to);
+  // Far away a coordinate is no number of a row.
+  if (to.y < 0 || from.y >= grid.ny) return;
   const int first = static_cast<int>(std::floor(std::max(from.y, 0.0)));
   const int last = static_cast<int>(std::floor(std::min(to.y, grid.ny - 1.0)));
   for (int j = first; j <= last; ++j) {
@@ -45,6 +47,7 @@ void CellsAlong(const GridGeometry& grid, MapPoint from, MapPoint to, double wid
   const double aside = length > 0 ? radius / length : 0;
   const MapPoint normal{-(b.y - a.y) * aside, (b.x - a.x) * aside};
   const double lowest = std::min(a.y, b.y) - radius, highest = std::max(a.y, b.y) + radius;
+  if (highest < 0 || lowest >= grid.ny) return;
   const int first = static_cast<int>(std::max(std::ceil(lowest - 0.5), 0.0));
   const int last = static_cast<int>(std::min(std::floor(highest - 0.5), grid.ny - 1.0));
   for (int j = first; j <= last; ++j) {

@@ -93,7 +93,7 @@ std::string GridEdit::Read() {
   int item = isGrid(item_) ? item_ : 1;
   while (item <= static_cast<int>(file.Items().size()) && !isGrid(item)) ++item;
   if (!isGrid(item)) return refused("it holds no grid");
-  original_ = std::move(original);
+  std::swap(original_, original);
   std::swap(file_, file);
   std::swap(updates_, updates);
   isStroke_ = false;
@@ -102,6 +102,7 @@ std::string GridEdit::Read() {
   auto grid = std::exchange(grid_, nullptr);
   if (std::string problem = Show(item, slice_); !problem.empty()) {
     // What cannot be read takes nothing away.
+    std::swap(original_, original);
     std::swap(file_, file);
     std::swap(updates_, updates);
     unsaved_ = std::move(unsaved);

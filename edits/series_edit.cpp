@@ -76,8 +76,13 @@ class SeriesEdit::RowsStep : public EditStep {
     const std::size_t count = rows_.stamps.size();
     Splice(edit_.rows_.stamps, old_, rows_.stamps);
     for (std::size_t series = 0; series < rows_.values.size(); ++series) {
-      Splice(edit_.rows_.values[series], old_, rows_.values[series]);
-      edit_.changed_.insert(series);
+      // Series that stay as they are need not be writable.
+      std::vector<float>& values = edit_.rows_.values[series];
+      const auto first = values.begin() + static_cast<std::ptrdiff_t>(old_.first);
+      const bool stays =
+          old_.count == count && std::equal(rows_.values[series].begin(), rows_.values[series].end(), first);
+      Splice(values, old_, rows_.values[series]);
+      if (!stays) edit_.changed_.insert(series);
     }
     std::swap(edit_.rows_.begin, rows_.begin);
     old_.count = count;

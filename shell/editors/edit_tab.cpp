@@ -6,6 +6,8 @@
 #include <QFileInfo>
 #include <QVBoxLayout>
 
+#include "document/setup_lock.h"
+#include "platform/files.h"
 #include "shell/widgets/banner.h"
 #include "shell/widgets/qt_text.h"
 
@@ -70,6 +72,12 @@ void EditTab::Step(std::string (EditedFile::*step)()) {
 bool EditTab::Save(const std::string& path) {
   Commit();
   const bool isRenamed = path != Path();
+  // What another editor holds is not written over.
+  SetupLock other;
+  if (isRenamed && isHolding_ && !IsSameFile(path, Path()) && other.Take(path) != SetupLock::Outcome::Taken) {
+    host_.ShowMessage(other.Reason(), Host::Icon::Error);
+    return false;
+  }
   FileResult result;
   {
     const WaitCursor wait;
@@ -79,6 +87,7 @@ bool EditTab::Save(const std::string& path) {
   if (!result.note.empty()) host_.ShowMessage(result.note, Host::Icon::Information);
   if (result.Ok()) {
     if (diskBanner_) delete diskBanner_;
+    other.Release();
     if (isRenamed && isHolding_) HoldFile();
     ShowReadOnly();
     if (isRenamed) Renamed();
@@ -93,7 +102,7 @@ void EditTab::CheckDisk() {
   if (diskBanner_ || !File().IsOtherOnDisk()) return;
   const bool isGone = !FileExists(Path());
   if (!isGone && !File().IsModified() && File().Reload().empty()) {
-    Sync();
+    Reread();
     emit StateChanged();
     return;
   }
@@ -108,7 +117,7 @@ void EditTab::CheckDisk() {
 
 void EditTab::Reload() {
   if (const std::string problem = File().Reload(); !problem.empty()) host_.ShowMessage(problem, Host::Icon::Error);
-  Sync();
+  Reread();
   emit StateChanged();
 }
 

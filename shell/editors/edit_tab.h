@@ -62,6 +62,8 @@ class EditTab : public QWidget {
   void HoldFile();
   /// Shows the file as it is now.
   virtual void Sync() = 0;
+  /// The same of a file that was read anew, which may hold other things.
+  virtual void Reread() { Sync(); }
   /// After a save under another name.
   virtual void Renamed() {}
   Host& Outside() const { return host_; }

@@ -60,6 +60,8 @@ class EditTable::Model : public QAbstractTableModel {
 
 EditTable::EditTable(EditTableContent content) : content_(std::move(content)), model_(new Model(*this)) {
   setModel(model_);
+  // What is done to a selection is done to all cells of its window.
+  setSelectionMode(QAbstractItemView::ContiguousSelection);
   setHorizontalScrollMode(QAbstractItemView::ScrollPerPixel);
   setWordWrap(false);
   setAccessibleName(tr("Values"));
@@ -109,6 +111,14 @@ void EditTable::Refill() {
     model_->Refill();
   else
     Reset();
+}
+
+void EditTable::CommitOpenEditor() {
+  if (state() != QAbstractItemView::EditingState) return;
+  QWidget* const editor = indexWidget(currentIndex());
+  if (!editor) return;
+  commitData(editor);
+  closeEditor(editor, QAbstractItemDelegate::NoHint);
 }
 
 void EditTable::GoTo(int row, int column) {

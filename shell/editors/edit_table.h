@@ -32,6 +32,8 @@ class EditTable : public QTableView {
   /// The same rows and columns with other values.
   void Refill();
   void GoTo(int row, int column);
+  /// Enters what stands in a cell that is being typed.
+  void CommitOpenEditor();
 
   Q_INVOKABLE void copy();
   Q_INVOKABLE void paste();

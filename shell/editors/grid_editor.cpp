@@ -77,10 +77,7 @@ GridEditor::GridEditor(const std::string& path, Host& host) : EditTab(host), edi
   count_.setInterval(kCountDelay);
   connect(&count_, &QTimer::timeout, this, &GridEditor::ShowStatistics);
   if (!edit_.Problem().empty()) return;
-  for (const DataItem& item : edit_.Items()) {
-    items_->addItem(ToQt(item.name));
-    if (item.dimensions < 2) items_->setItemData(items_->count() - 1, 0, Qt::UserRole - 1);  // cannot be chosen
-  }
+  FillItems();
   Sync();
   for (const std::string& note : edit_.Notes()) panel_->Tell(panel_->Told() + ToQt(note) + "\n");
 }
@@ -92,6 +89,7 @@ GridEditor::~GridEditor() {
 
 void GridEditor::Commit() {
   if (!edit_.Problem().empty()) return;
+  table_->CommitOpenEditor();
   edit_.EndStroke();
   WaitForPicture();
 }
@@ -121,6 +119,21 @@ void GridEditor::Sync() {
   if (items_->currentIndex() != edit_.Item() - 1 || !coloured_) return ShowItem();
   if (coloured_ != edit_.Grid()) return ShowSlice();
   Follow();
+}
+
+void GridEditor::Reread() {
+  if (!edit_.Problem().empty()) return;
+  FillItems();
+  ShowItem();
+}
+
+void GridEditor::FillItems() {
+  const QSignalBlocker blocked(items_);
+  items_->clear();
+  for (const DataItem& item : edit_.Items()) {
+    items_->addItem(ToQt(item.name));
+    if (item.dimensions < 2) items_->setItemData(items_->count() - 1, 0, Qt::UserRole - 1);  // cannot be chosen
+  }
 }
 
 void GridEditor::ShowItem() {

@@ -52,11 +52,13 @@ class GridEditor : public EditTab {
 
  protected:
   void Sync() override;
+  void Reread() override;
 
  private:
   QWidget* BuildTools();
   EditPanel* BuildPanel();
   EditTable* BuildTable();
+  void FillItems();
   void ShowItem();
   void ShowSlice();
   void ShowMap();

@@ -82,13 +82,8 @@ SeriesEditor::SeriesEditor(const std::string& path, Host& host) : EditTab(host),
     ShowStatistics();
   });
   if (!edit_.Problem().empty()) return;
-  for (std::size_t series = 0; series < edit_.SeriesCount(); ++series) {
-    const DataItem& item = edit_.ItemOf(series);
-    list_->addItem(ToQt(item.name) + "\n" + ToQt(ShortUnitOf(item)) + ", " + ToQt(ValueTypeText(item.valueType)));
-  }
-  list_->setCurrentRow(0);
+  FillList();
   connect(list_, &QListWidget::itemSelectionChanged, &rest_, qOverload<>(&QTimer::start));
-  table_->Reset();
   connect(table_->selectionModel(), &QItemSelectionModel::selectionChanged, this, [this] { ShowStatistics(); });
   chart_->Show(Chart());
   ShowStatistics();
@@ -245,8 +240,29 @@ CYbDateTime SeriesEditor::DateIn(const QLineEdit& field) {
 
 // ---- What is shown
 
+void SeriesEditor::Commit() { table_->CommitOpenEditor(); }
+
+void SeriesEditor::FillList() {
+  QStringList texts, shown;
+  for (std::size_t series = 0; series < edit_.SeriesCount(); ++series) {
+    const DataItem& item = edit_.ItemOf(series);
+    texts << ToQt(item.name) + "\n" + ToQt(ShortUnitOf(item)) + ", " + ToQt(ValueTypeText(item.valueType));
+  }
+  for (int row = 0; row < list_->count(); ++row) shown << list_->item(row)->text();
+  if (texts == shown) return;
+  const QSignalBlocker blocked(list_);
+  const int current = std::max(0, list_->currentRow());
+  list_->clear();
+  list_->addItems(texts);
+  list_->setCurrentRow(std::min(current, list_->count() - 1));
+  table_->Reset();
+}
+
 void SeriesEditor::Sync() {
-  if (edit_.Problem().empty()) Follow();
+  if (!edit_.Problem().empty()) return;
+  // Another program may have written other series.
+  FillList();
+  Follow();
 }
 
 RowSpan SeriesEditor::Rows() const {

@@ -33,6 +33,7 @@ class SeriesEditor : public EditTab {
 
   EditedFile& File() override { return edit_; }
   SeriesEdit& Edited() { return edit_; }
+  void Commit() override;
   Host::FileQuestion NameQuestion() const override;
 
  protected:
@@ -41,6 +42,8 @@ class SeriesEditor : public EditTab {
  private:
   EditPanel* BuildPanel();
   EditTable* BuildTable();
+  /// The series of the file in the list, where it has others.
+  void FillList();
   SeriesContent Chart() const;
   /// What the user has changed or chosen is shown.
   void Follow();

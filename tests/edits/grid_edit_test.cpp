@@ -7,6 +7,7 @@
 #include <gmock/gmock.h>
 
 #include "data/datafile_writer.h"
+#include "edits/cell_figures.h"
 #include "tests/support/data_files.h"
 #include "tests/support/temp_folder.h"
 
@@ -127,6 +128,18 @@ TEST_F(GridEditTest, WhatIsPaintedIsOneStepAndTheSameOnTurnedGrids) {
       EXPECT_EQ(Values(edit), after);
     }
   }
+}
+
+TEST_F(GridEditTest, PlacesFarFromTheGridChangeNothing) {
+  GridGeometry grid{kNx, kNy, 10, 1000, 2000, 0, {}};
+  for (const double far : {1e38, -1e38, 1e12})
+    for (const double width : {1.0, 3.0})
+      for (const auto& [from, to] :
+           {std::pair{MapPoint{1010, far}, MapPoint{1010, far}}, std::pair{MapPoint{far, 2010}, MapPoint{far, 2010}},
+            std::pair{MapPoint{far, far}, MapPoint{far, far}}})
+        CellsAlong(grid, from, to, width, [&](int j, int begin, int end) {
+          ADD_FAILURE() << far << ": row " << j << " from " << begin << " to " << end;
+        });
 }
 
 TEST_F(GridEditTest, FillStopsAtOtherValues) {

@@ -10,6 +10,7 @@
 #include <gmock/gmock.h>
 
 #include "data/datafile_writer.h"
+#include "document/setup_lock.h"
 #include "shell/charts/series_plot.h"
 #include "shell/editors/edit_panel.h"
 #include "shell/editors/edit_table.h"
@@ -149,6 +150,52 @@ TEST_F(SeriesEditorTest, PastedTimesMakeRows) {
   Table().paste();
   EXPECT_THAT(FromQt(Panel().Told()), HasSubstr("words is no number"));
   QTest::qWait(200);
+}
+
+TEST_F(SeriesEditorTest, AFileWithOtherSeriesIsShownAsItIs) {
+  const std::string other = setup_.Folder().File("other.nds0");
+  NewDataFile content;
+  content.dimensions = 0;
+  for (const char* name : {"Rain", "Level", "Flow", "Snow"})
+    content.items.push_back({name, quantity::kElevation, 1000, {}});
+  DataFileWriter writer;
+  test::Require(writer.Create(other, content));
+  for (int day = 1; day <= 3; ++day) {
+    test::Require(writer.AddStep(CYbDateTime(2001, 1, day)));
+    const float value = static_cast<float>(day);
+    for (int item = 1; item <= 4; ++item) test::Require(writer.Put(item, {&value, 1}));
+  }
+  test::Require(writer.Finish().error);
+  std::filesystem::rename(other, path_);
+  editor_->Reload();
+  EXPECT_EQ(List().count(), 4);
+  EXPECT_EQ(Table().model()->columnCount(), 5);
+  EXPECT_EQ(Table().model()->rowCount(), 3);
+  List().setCurrentRow(3);
+  QTest::qWait(100);
+  EXPECT_EQ(Edit().ValueOf(3, 2), 3);
+}
+
+TEST_F(SeriesEditorTest, WhatStandsInAnOpenCellIsSaved) {
+  Table().GoTo(0, 1);
+  Table().edit(Table().currentIndex());
+  auto* typed = qobject_cast<QLineEdit*>(Table().indexWidget(Table().currentIndex()));
+  ASSERT_TRUE(typed);
+  typed->setText("7.5");
+  EXPECT_FALSE(editor_->File().IsModified());
+  ASSERT_TRUE(editor_->Save(path_));
+  EXPECT_EQ(Edit().ValueOf(0, 0), 7.5F);
+  EXPECT_FALSE(editor_->File().IsModified());
+}
+
+TEST_F(SeriesEditorTest, AFileThatAnotherEditorHoldsIsNotSavedOver) {
+  const std::string held = setup_.Folder().Write("held.nds0", "of another");
+  SetupLock lock;
+  ASSERT_EQ(lock.Take(held), SetupLock::Outcome::Taken);
+  const NextAnswer told("OK");
+  EXPECT_FALSE(editor_->Save(held));
+  EXPECT_EQ(test::ReadFile(held), "of another");
+  EXPECT_EQ(editor_->Path(), path_);
 }
 
 }  // namespace
