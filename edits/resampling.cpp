@@ -20,9 +20,10 @@ std::int64_t MonthStart(std::int64_t month) {
 /// The ends of steps that are not before a time.
 class StepEnds {
  public:
-  /// Steps of several days have no place in the calendar: they count from the first day.
+  /// Steps that do not divide the day have no place in the calendar: they count from the first day.
   StepEnds(const ResamplingStep& step, std::int64_t first)
-      : step_(step), origin_(step.seconds > kDaySeconds ? first - Rest(first, kDaySeconds) : 0) {}
+      : step_(step),
+        origin_(step.seconds > 0 && kDaySeconds % step.seconds != 0 ? first - Rest(first, kDaySeconds) : 0) {}
 
   /// The last end that is not after the time.
   std::int64_t Before(std::int64_t stamp) const {
