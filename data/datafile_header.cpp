@@ -317,6 +317,7 @@ class HeaderReader {
                                    static_cast<double>(NC_FILL_INT64),
                                    static_cast<double>(NC_FILL_UINT64)};
       storage.missing.push_back(kFills[variable.type]);
+      storage.isFillAssumed = true;
     }
     for (const double value : NumbersAttribute(file_, id, "missing_value")) storage.missing.push_back(value);
     std::vector<double> range = NumbersAttribute(file_, id, "valid_range");

@@ -31,6 +31,7 @@ struct ItemStorage {
   double scale = 1, offset = 0;
   bool isUnsigned = false;  ///< Numbers of a signed type that mean unsigned ones.
   std::vector<double> missing;
+  bool isFillAssumed = false;  ///< The first of these is that of the library, since the file tells none.
   double validFrom = -std::numeric_limits<double>::infinity();
   double validTo = std::numeric_limits<double>::infinity();
   std::vector<double> range;  ///< As stored; empty when it is not.
@@ -44,6 +45,16 @@ struct ItemStorage {
   void MarkMissing(std::span<float> values) const;
   /// The number that a stored one means; a NaN when it is missing.
   double Unpacked(double stored) const;
+
+  // Of values that are stored as they are.
+
+  /// What numbers of the file mean to those who read it.
+  std::vector<float> Meant(std::span<const double> numbers) const;
+  /// A value as the file has it; for kDeleteValue a mark that the file tells itself, where there is one.
+  double Stored(float value) const;
+  /// The same of many, in the place of the numbers that stand there: one that means the same stays as it is, with all
+  /// its digits and its own mark of what is missing.
+  std::vector<double> Stored(std::span<const float> values, std::span<const double> old) const;
 };
 
 struct DataFileHeader {

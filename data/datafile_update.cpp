@@ -5,8 +5,11 @@
 #include <algorithm>
 #include <array>
 #include <cmath>
+#include <limits>
 #include <new>
+#include <limits>
 #include <set>
+#include <unordered_map>
 #include <utility>
 
 #include <fmt/format.h>
@@ -59,17 +62,15 @@ std::string WhyNotStored(const ItemStorage& storage) {
   return {};
 }
 
-/// What stands for a missing value in the file.
-float MissingMark(const ItemStorage& storage) {
-  return storage.missing.empty() ? kDeleteValue : static_cast<float>(storage.missing.front());
-}
-
-/// Values as the file has them.
-std::vector<float> Stored(std::span<const float> values, const ItemStorage& storage) {
-  std::vector<float> stored(values.begin(), values.end());
-  const float mark = MissingMark(storage);
-  for (float& value : stored) value = value == kDeleteValue || !std::isfinite(value) ? mark : value;
-  return stored;
+/// Writes values into a part of a variable. The lock must be held.
+int PutPart(int file, const ItemStorage& storage, std::span<const std::size_t> start,
+            std::span<const std::size_t> count, std::span<const float> values) {
+  std::vector<double> numbers(values.size());
+  if (const int status =
+          netcdf::Library().nc_get_vara_double(file, storage.variable, start.data(), count.data(), numbers.data()))
+    return status;
+  numbers = storage.Stored(values, numbers);
+  return netcdf::Library().nc_put_vara_double(file, storage.variable, start.data(), count.data(), numbers.data());
 }
 
 std::string NameOfVariable(int file, int variable) {
@@ -259,7 +260,7 @@ std::string DataFileUpdate::PutLayer(int item, const GridSlice& slice, std::span
     if (!isAny) continue;
     piece.clear();
     for (std::size_t row = first; row < last; ++row) {
-      const std::vector<float> stored = Stored(values.subspan(rowAt(row) * nx, nx), *storage);
+      const std::span<const float> stored = values.subspan(rowAt(row) * nx, nx);
       piece.insert(piece.end(), stored.begin(), stored.end());
     }
     if (storage->y >= 0) {
@@ -267,8 +268,7 @@ std::string DataFileUpdate::PutLayer(int item, const GridSlice& slice, std::span
       count[at(storage->y)] = last - first;
     }
     const netcdf::Lock lock;
-    const int status = netcdf::Library().nc_put_vara_float(state.file.Id(), storage->variable, start.data(),
-                                                           count.data(), piece.data());
+    const int status = PutPart(state.file.Id(), *storage, start, count, piece);
     if (status != NC_NOERR) return state.Fail(netcdf::InWords(status));
   }
   return {};
@@ -282,10 +282,8 @@ std::string DataFileUpdate::PutSeries(int item, std::span<const float> values) {
   if (storage->time < 0 || values.size() != storage->lengths[static_cast<std::size_t>(storage->time)])
     return state.Fail("a series has another length");
   std::vector<std::size_t> start(storage->lengths.size(), 0), count = storage->lengths;
-  const std::vector<float> stored = Stored(values, *storage);
   const netcdf::Lock lock;
-  const int status = netcdf::Library().nc_put_vara_float(state.file.Id(), storage->variable, start.data(), count.data(),
-                                                         stored.data());
+  const int status = PutPart(state.file.Id(), *storage, start, count, values);
   return status == NC_NOERR ? std::string() : state.Fail(netcdf::InWords(status));
 }
 
@@ -394,8 +392,15 @@ class SeriesRewriter {
     int isShuffled = 0, isPacked = 0, level = 0, layout = NC_CONTIGUOUS;
     std::vector<std::size_t> chunk(shape.size());
     if (!shape.empty() && netcdf::Library().nc_inq_var_chunking(from_, id, &layout, chunk.data()) == NC_NOERR &&
-        layout == NC_CHUNKED)
+        layout == NC_CHUNKED) {
+      // A piece is not longer than a dimension that cannot grow.
+      for (std::size_t place = 0; place < shape.size(); ++place) {
+        std::size_t length = 0;
+        netcdf::Library().nc_inq_dim(to_, shape[place], nullptr, &length);
+        if (length > 0) chunk[place] = std::min(chunk[place], length);
+      }
       if (const int status = netcdf::Library().nc_def_var_chunking(to_, made, NC_CHUNKED, chunk.data())) return status;
+    }
     if (netcdf::Library().nc_inq_var_deflate(from_, id, &isShuffled, &isPacked, &level) == NC_NOERR && isPacked)
       return netcdf::Library().nc_def_var_deflate(to_, made, isShuffled, isPacked, level);
     return NC_NOERR;
@@ -441,10 +446,24 @@ class SeriesRewriter {
   }
 
   int PutItem(int made, std::size_t item) {
-    const std::vector<float> stored = Stored(series_.items[item], header_.storages[item]);
-    std::vector<std::size_t> start(header_.storages[item].lengths.size(), 0), count(start.size(), 1);
-    count[static_cast<std::size_t>(header_.storages[item].time)] = stored.size();
-    if (const int status = netcdf::Library().nc_put_vara_float(to_, made, start.data(), count.data(), stored.data()))
+    const ItemStorage& storage = header_.storages[item];
+    std::vector<std::size_t> start(storage.lengths.size(), 0), count = storage.lengths;
+    std::vector<double> old(count[static_cast<std::size_t>(storage.time)]);
+    if (!old.empty())
+      if (const int status =
+              netcdf::Library().nc_get_vara_double(from_, storage.variable, start.data(), count.data(), old.data()))
+        return status;
+    // Values that have moved to other rows keep all their digits.
+    const std::vector<float> meant = storage.Meant(old);
+    std::unordered_map<float, double> numberOf;
+    for (std::size_t i = 0; i < old.size(); ++i) numberOf.emplace(meant[i], old[i]);
+    std::vector<double> stored;
+    for (const float value : series_.items[item]) {
+      const auto found = numberOf.find(value);
+      stored.push_back(found != numberOf.end() ? found->second : storage.Stored(value));
+    }
+    count[static_cast<std::size_t>(storage.time)] = stored.size();
+    if (const int status = netcdf::Library().nc_put_vara_double(to_, made, start.data(), count.data(), stored.data()))
       return status;
     ValueSummary summary;
     summary.AddRange(series_.items[item]);

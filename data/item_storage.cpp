@@ -42,6 +42,32 @@ double ItemStorage::Unpacked(double stored) const {
   return stored * scale + offset;
 }
 
+std::vector<float> ItemStorage::Meant(std::span<const double> numbers) const {
+  constexpr double kLargest = static_cast<double>(std::numeric_limits<float>::max());
+  std::vector<float> values;
+  values.reserve(numbers.size());
+  for (const double number : numbers)
+    values.push_back(std::abs(number) <= kLargest ? static_cast<float>(number)
+                                                  : std::numeric_limits<float>::quiet_NaN());
+  MarkMissing(values);
+  return values;
+}
+
+double ItemStorage::Stored(float value) const {
+  if (value != kDeleteValue && std::isfinite(value)) return static_cast<double>(value);
+  if (missing.empty()) return static_cast<double>(kDeleteValue);
+  return isFillAssumed && missing.size() > 1 ? missing[1] : missing.front();
+}
+
+std::vector<double> ItemStorage::Stored(std::span<const float> values, std::span<const double> old) const {
+  const std::vector<float> meant = Meant(old);
+  std::vector<double> stored;
+  stored.reserve(values.size());
+  for (std::size_t i = 0; i < values.size(); ++i)
+    stored.push_back(i < meant.size() && values[i] == meant[i] ? old[i] : Stored(values[i]));
+  return stored;
+}
+
 bool ItemStorage::HasValidRange() const { return std::isfinite(validFrom) || std::isfinite(validTo); }
 
 bool ItemStorage::IsInOrder() const {

@@ -110,6 +110,27 @@ TEST_F(DataFileUpdateTest, WhatIsNotChangedStaysInFilesOfEveryForm) {
   }
 }
 
+TEST_F(DataFileUpdateTest, CellsThatStayKeepTheirDigitsAndTheirMarks) {
+  // Numbers that no float has, and a mark that only missing_value tells.
+  Make("classic",
+       "netcdf a { dimensions: time = 1; y = 1; x = 4; variables: double time(time); time:units = \"days since "
+       "2000-01-01\"; double y(y); y:standard_name = \"projection_y_coordinate\"; y:units = \"m\"; double x(x); "
+       "x:standard_name = \"projection_x_coordinate\"; x:units = \"m\"; double level(time, y, x); level:units = "
+       "\"m\"; level:missing_value = -9999.; data: time = 1; y = 5; x = 5, 15, 25, 35; level = 0.1, 0.2, -9999, 0.4; "
+       "}");
+  std::vector<float> layer = Read(path, 1, 0);
+  ASSERT_EQ(layer.size(), 4U);
+  EXPECT_EQ(layer[2], kDeleteValue);
+  layer[1] = 7;
+  layer[3] = kDeleteValue;
+  os::File held = Held();
+  DataFileUpdate update;
+  ASSERT_EQ(update.Begin(held, path), "");
+  ASSERT_EQ(update.PutLayer(1, {0, 0}, layer, [](int) { return true; }), "");
+  ASSERT_EQ(update.Finish().error, "");
+  EXPECT_THAT(Dump(path), testing::ContainsRegex("level =[ \n]*0\\.1, 7, -9999, -9999 ;"));
+}
+
 TEST_F(DataFileUpdateTest, WhatCannotBeChangedIsTold) {
   Make("classic", Replaced(Replaced(Replaced(kGrid, "TYPE", "float"), "FILL", "-99.f"), "YS", "1, 2, 3"));
   const FileUpdateFacts facts = UpdateFactsOf(path);
