@@ -7,7 +7,6 @@
 #include <cmath>
 #include <limits>
 #include <new>
-#include <limits>
 #include <set>
 #include <unordered_map>
 #include <utility>
