@@ -377,6 +377,9 @@ std::string SeriesEdit::ShiftTimes(std::int64_t seconds, int months) {
       return fmt::format("two times would fall on {}, since months differ in length", TextOfStamp(rows.stamps[row]));
   }
   if (rows.begin) rows.begin = moved(*rows.begin);
+  if (rows.begin && *rows.begin >= rows.stamps.front())
+    return fmt::format("the first step would have no length, since months differ in length: it would end on {}",
+                       TextOfStamp(rows.stamps.front()));
   if (rows.stamps == rows_.stamps) return {};
   // The values stay where they are.
   rows.values.clear();

@@ -42,33 +42,14 @@ class PageLines {
  private:
   void AddValue(const Control& control) {
     const std::string label = NameOf(control);
-    switch (control.kind) {
-      case ControlKind::Check:
-        return AddLine(label, control.Text() == "1" ? "on" : "off");
-      case ControlKind::Radio:
-      case ControlKind::Choice: {
-        const std::vector<std::string> options = control.Options();
-        const int chosen = control.Option();
-        if (options.empty()) return;
-        const std::string value = chosen >= 0 ? SpokenLabel(options[static_cast<std::size_t>(chosen)])
-                                              : control.Text() + " (not in the list)";
-        // The method of what stands in front of it in its row.
-        if (!label.empty() || !control.beside || lines_.empty()) return AddLine(label, value);
-        lines_.back().text += ", " + value;
-        return;
-      }
-      case ControlKind::Text:
-      case ControlKind::LongText:
-      case ControlKind::Integer:
-      case ControlKind::Number:
-      case ControlKind::Date:
-      case ControlKind::File: {
-        const std::string unit = control.UnitText(), value = Replaced(control.Text(), "\n", " ");
-        return AddLine(label, value.empty() ? "none" : unit.empty() ? value : fmt::format("{} {}", value, unit));
-      }
-      default:
-        return;
-    }
+    const std::optional<std::string> value = ValueInWords(control);
+    if (!value) return;
+    const bool isChoice = control.kind == ControlKind::Choice || control.kind == ControlKind::Radio;
+    // The method of what stands in front of it in its row.
+    if (isChoice && label.empty() && control.beside && !lines_.empty())
+      lines_.back().text += ", " + *value;
+    else
+      AddLine(label, value->empty() ? "none" : *value);
   }
 
   void AddRows(const TableForm& table) {
@@ -93,6 +74,33 @@ class PageLines {
 };
 
 }  // namespace
+
+std::optional<std::string> ValueInWords(const Control& control) {
+  constexpr std::string_view kNoUnit = "-";  // Of what has no dimension.
+  switch (control.kind) {
+    case ControlKind::Check:
+      return control.Text() == "1" ? "on" : "off";
+    case ControlKind::Radio:
+    case ControlKind::Choice: {
+      const std::vector<std::string> options = control.Options();
+      const int chosen = control.Option();
+      if (options.empty()) return std::nullopt;
+      return chosen >= 0 ? SpokenLabel(options[static_cast<std::size_t>(chosen)])
+                         : control.Text() + " (not in the list)";
+    }
+    case ControlKind::Text:
+    case ControlKind::LongText:
+    case ControlKind::Integer:
+    case ControlKind::Number:
+    case ControlKind::Date:
+    case ControlKind::File: {
+      const std::string unit = control.UnitText(), value = Replaced(control.Text(), "\n", " ");
+      return unit.empty() || unit == kNoUnit || value.empty() ? value : fmt::format("{} {}", value, unit);
+    }
+    default:
+      return std::nullopt;
+  }
+}
 
 std::vector<OverviewLine> OverviewInWords(CYbSEDocument& document) {
   std::vector<OverviewLine> lines;

@@ -11,6 +11,7 @@
 #include "forms/table_form.h"
 #include "geometry/cart.h"
 #include "pages/key_defaults.h"
+#include "pages/overview_lines.h"
 #include "pages/parts/plot_content.h"
 #include "pages/place_names.h"
 #include "pages/report/report.h"
@@ -26,33 +27,6 @@ namespace {
 constexpr std::string_view kNoUnit = "-";  ///< Of what has no dimension.
 constexpr std::size_t kMostRows = 60;      ///< Of a table of a page.
 constexpr int kMostAlike = 2;              ///< Pages of one kind, such as those of stations, whose plots are shown.
-
-/// "Initial time step: 6" of a control, where it shows a value that people read.
-std::optional<std::string> ValueInWords(const Control& control) {
-  switch (control.kind) {
-    case ControlKind::Check:
-      return control.Text() == "1" ? "on" : "off";
-    case ControlKind::Radio:
-    case ControlKind::Choice: {
-      const std::vector<std::string> options = control.Options();
-      const int chosen = control.Option();
-      if (options.empty()) return std::nullopt;
-      return chosen >= 0 ? SpokenLabel(options[static_cast<std::size_t>(chosen)])
-                         : control.Text() + " (not in the list)";
-    }
-    case ControlKind::Text:
-    case ControlKind::LongText:
-    case ControlKind::Integer:
-    case ControlKind::Number:
-    case ControlKind::Date:
-    case ControlKind::File: {
-      const std::string unit = control.UnitText(), value = Replaced(control.Text(), "\n", " ");
-      return unit.empty() || unit == kNoUnit || value.empty() ? value : fmt::format("{} {}", value, unit);
-    }
-    default:
-      return std::nullopt;
-  }
-}
 
 /// The default as the tool tip of the control tells it.
 std::string DefaultInWords(KeyDefaults& defaults, const Control& control) {

@@ -3,15 +3,14 @@
 #pragma once
 
 #include <QAbstractTableModel>
-#include <QTableView>
 
 #include "pages/data_file_view.h"
+#include "shell/editors/value_table.h"
 
 namespace tervane {
 
-/// The values of a data file as a table that is only read: cells are asked for when they are seen, and copied as a
-/// spreadsheet takes them.
-class DataTable : public QTableView {
+/// The values of a data file as a table that is only read.
+class DataTable : public ValueTable {
   Q_OBJECT
 
  public:
@@ -21,16 +20,10 @@ class DataTable : public QTableView {
   void Reset();
   /// The same rows and columns with other values.
   void Refill();
-  /// Makes a cell the current one and shows it.
-  void GoTo(std::size_t row, std::size_t column);
 
   /// Copies the selection; all with its heads when the whole table is selected. A slot's name, as all widgets have it.
   Q_INVOKABLE void copy() { Copy(false); }
   void CopyWithHeads() { Copy(true); }
-
- signals:
-  /// What the user should know: a selection that no clipboard takes.
-  void Told(const QString& text);
 
  protected:
   void keyPressEvent(QKeyEvent* event) override;
@@ -39,7 +32,6 @@ class DataTable : public QTableView {
   class Model;
 
   void Copy(bool withHeads);
-  void FollowTheme();
 
   DataFileView& file_;
   Model* model_;

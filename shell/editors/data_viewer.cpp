@@ -299,7 +299,7 @@ void DataViewer::ShowItem() {
       further_.AddTo(chart);
       return chart;
     });
-    table_->GoTo(0, file_.ColumnOf(file_.Chosen().front()));
+    table_->GoTo(0, static_cast<int>(file_.ColumnOf(file_.Chosen().front())));
   } else {
     chart_->StopWaiting();
   }
@@ -377,7 +377,7 @@ void DataViewer::AskLine() {
 void DataViewer::PickCell(const MapPick& pick) {
   if (!pick.cell) return;
   const auto [row, column] = file_.TableCellOf(pick.cell->first, pick.cell->second);
-  table_->GoTo(row, column);
+  table_->GoTo(static_cast<int>(row), static_cast<int>(column));
   if (file_.Steps() < 2 || !file_.HasDates()) return;
   result_.PickCell(pick.cell->first, pick.cell->second);
   below_->setCurrentWidget(cells_);
@@ -462,7 +462,7 @@ void DataViewer::GoToDate() {
   const std::size_t row = file_.ShowRowOf(step, isMoved);
   if (isMoved) table_->Reset();
   tableText_->setText(ToQt(file_.TableText()));
-  table_->GoTo(row, file_.ColumnOf(file_.Chosen().front()));
+  table_->GoTo(static_cast<int>(row), static_cast<int>(file_.ColumnOf(file_.Chosen().front())));
 }
 
 void DataViewer::ShowNotes(const QString& text) {

@@ -6,13 +6,9 @@
 #include <QAction>
 #include <QApplication>
 #include <QClipboard>
-#include <QHeaderView>
 #include <QKeyEvent>
 #include <algorithm>
-#include <limits>
 #include <utility>
-
-#include "shell/widgets/theme.h"
 
 namespace tervane {
 
@@ -62,11 +58,6 @@ EditTable::EditTable(EditTableContent content) : content_(std::move(content)), m
   setModel(model_);
   // What is done to a selection is done to all cells of its window.
   setSelectionMode(QAbstractItemView::ContiguousSelection);
-  setHorizontalScrollMode(QAbstractItemView::ScrollPerPixel);
-  setWordWrap(false);
-  setAccessibleName(tr("Values"));
-  verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
-  setContextMenuPolicy(Qt::ActionsContextMenu);
   const auto add = [this](const QString& text, const QKeySequence& keys, void (EditTable::*command)()) {
     auto* action = new QAction(text, this);
     // The keys are heard below; here they are told.
@@ -77,14 +68,6 @@ EditTable::EditTable(EditTableContent content) : content_(std::move(content)), m
   add(tr("&Copy"), QKeySequence::Copy, &EditTable::copy);
   add(tr("&Paste"), QKeySequence::Paste, &EditTable::paste);
   add(tr("&Delete Values"), QKeySequence::Delete, &EditTable::Clear);
-  connect(&Theme::Get(), &Theme::Changed, this, &EditTable::FollowTheme);
-  FollowTheme();
-}
-
-void EditTable::FollowTheme() {
-  setFont(QApplication::font());
-  verticalHeader()->setDefaultSectionSize(fontMetrics().height() + Theme::Get().Scaled(6));
-  horizontalHeader()->setDefaultSectionSize(fontMetrics().horizontalAdvance("-0000000.000") + Theme::Get().Scaled(10));
 }
 
 void EditTable::Reset() {
@@ -93,17 +76,7 @@ void EditTable::Reset() {
   model_->Reset();
   if (row >= 0 && model_->rowCount() > 0 && model_->columnCount() > 0)
     setCurrentIndex(model_->index(std::min(row, model_->rowCount() - 1), std::min(column, model_->columnCount() - 1)));
-  // Heads of series are names; those of grids are numbers, and there may be thousands of them.
-  constexpr int kFewColumns = 60;
-  if (model_->columnCount() > kFewColumns) return;
-  for (int each = 0; each < model_->columnCount(); ++each) {
-    const QString head = model_->headerData(each, Qt::Horizontal, Qt::DisplayRole).toString();
-    const QString cell = model_->rowCount() > 0 ? content_.text(0, each) : QString();
-    const int wanted =
-        std::max(horizontalHeader()->fontMetrics().horizontalAdvance(head), fontMetrics().horizontalAdvance(cell)) +
-        Theme::Get().Scaled(24);
-    setColumnWidth(each, std::clamp(wanted, horizontalHeader()->defaultSectionSize(), Theme::Get().Scaled(260)));
-  }
+  FitColumns();
 }
 
 void EditTable::Refill() {
@@ -121,40 +94,14 @@ void EditTable::CommitOpenEditor() {
   closeEditor(editor, QAbstractItemDelegate::NoHint);
 }
 
-void EditTable::GoTo(int row, int column) {
-  const QModelIndex index = model_->index(row, column);
-  setCurrentIndex(index);
-  scrollTo(index, QAbstractItemView::PositionAtCenter);
-}
-
-bool EditTable::Selected(int& top, int& left, int& bottom, int& right) const {
-  top = left = std::numeric_limits<int>::max();
-  bottom = right = -1;
-  for (const QItemSelectionRange& range : selectionModel()->selection()) {
-    top = std::min(top, range.top());
-    left = std::min(left, range.left());
-    bottom = std::max(bottom, range.bottom());
-    right = std::max(right, range.right());
-  }
-  return bottom >= 0;
-}
-
 void EditTable::Tell(const QString& told) {
   emit Told(told);
   emit Changed();
 }
 
 void EditTable::copy() {
-  constexpr double kMostCopied = 5e6;
   int top = 0, left = 0, bottom = 0, right = 0;
-  if (!Selected(top, left, bottom, right)) return;
-  const double cells = (1.0 + bottom - top) * (1.0 + right - left);
-  if (cells > kMostCopied) {
-    emit Told(tr("%L1 cells are more than the clipboard takes; select at most %L2.")
-                  .arg(cells, 0, 'f', 0)
-                  .arg(kMostCopied, 0, 'f', 0));
-    return;
-  }
+  if (!SelectedToCopy(top, left, bottom, right)) return;
   QString text;
   for (int row = top; row <= bottom; ++row)
     for (int column = left; column <= right; ++column)
@@ -180,7 +127,7 @@ void EditTable::keyPressEvent(QKeyEvent* event) {
   if (event->matches(QKeySequence::Copy)) return copy();
   if (event->matches(QKeySequence::Paste)) return paste();
   if (event->matches(QKeySequence::Delete) || event->key() == Qt::Key_Backspace) return Clear();
-  QTableView::keyPressEvent(event);
+  ValueTable::keyPressEvent(event);
 }
 
 }  // namespace tervane

@@ -2,8 +2,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <QTableView>
 #include <functional>
+
+#include "shell/editors/value_table.h"
 
 namespace tervane {
 
@@ -21,7 +22,7 @@ struct EditTableContent {
 };
 
 /// The values of a file that is edited: cells are typed, copied, pasted and cleared as in a spreadsheet.
-class EditTable : public QTableView {
+class EditTable : public ValueTable {
   Q_OBJECT
 
  public:
@@ -31,18 +32,14 @@ class EditTable : public QTableView {
   void Reset();
   /// The same rows and columns with other values.
   void Refill();
-  void GoTo(int row, int column);
   /// Enters what stands in a cell that is being typed.
   void CommitOpenEditor();
 
   Q_INVOKABLE void copy();
   Q_INVOKABLE void paste();
   void Clear();
-  /// The window around the selection, from top left to bottom right; false without one.
-  bool Selected(int& top, int& left, int& bottom, int& right) const;
 
  signals:
-  void Told(const QString& text);
   /// The user has changed something.
   void Changed();
 
@@ -53,7 +50,6 @@ class EditTable : public QTableView {
   class Model;
 
   void Tell(const QString& told);
-  void FollowTheme();
 
   EditTableContent content_;
   Model* model_;

@@ -153,6 +153,7 @@ EditTable* GridEditor::BuildTable() {
     const std::string bytes = FromQt(text);
     CsvReader reader(bytes, false);
     std::vector<std::string> line;
+    int beyond = 0;
     for (; reader.Next(line); ++row) {
       for (std::size_t k = 0; k < line.size(); ++k) {
         const std::string_view cell = Trimmed(line[k]);
@@ -160,11 +161,15 @@ EditTable* GridEditor::BuildTable() {
         if (!number && !cell.empty()) return tr("Line %1: %2 is no number.").arg(reader.Line()).arg(ToQt(cell));
         if (const std::string why = number ? edit_.WhyNotValue(*number) : std::string(); !why.empty())
           return tr("Line %1: %2").arg(reader.Line()).arg(ToQt(why));
-        cells.emplace_back(column + static_cast<int>(k), rowOf(row),
-                           number ? static_cast<float>(*number) : kDeleteValue);
+        const int i = column + static_cast<int>(k), j = rowOf(row);
+        if (i >= edit_.Grid()->Geometry().nx || j < 0)
+          ++beyond;
+        else
+          cells.emplace_back(i, j, number ? static_cast<float>(*number) : kDeleteValue);
       }
     }
-    return put("Paste", std::move(cells));
+    const QString told = put("Paste", std::move(cells));
+    return told.isEmpty() && beyond > 0 ? tr("%L1 values lie beyond the grid and were left out.").arg(beyond) : told;
   };
   content.clear = [rowOf, put](int top, int left, int bottom, int right) {
     std::vector<std::tuple<int, int, float>> cells;

@@ -331,6 +331,11 @@ void ReliefCanvas::resizeEvent(QResizeEvent* /*event*/) {
     Move();
 }
 
+void ReliefCanvas::showEvent(QShowEvent* event) {
+  QWidget::showEvent(event);
+  Move();
+}
+
 void ReliefCanvas::mousePressEvent(QMouseEvent* event) { draggedTo_ = event->position(); }
 
 void ReliefCanvas::mouseMoveEvent(QMouseEvent* event) {

@@ -98,5 +98,19 @@ TEST(ReliefWindow, WithoutGroundItSaysWhy) {
   EXPECT_EQ(relief.Canvas().TextAt({10, 10}), "");
 }
 
+TEST(ReliefWindow, WhatIsThereBeforeTheWindowIsShownIsDrawnWithIt) {
+  NobodyToAsk host;
+  ReliefWindow window(nullptr, host, "3D View");
+  window.setAttribute(Qt::WA_DeleteOnClose, false);
+  window.resize(900, 600);
+  const SectionContent ground = Ground();
+  window.Show(ReliefOf([&ground] { return ground; }), PaintGround, {});
+  EXPECT_TRUE(QTest::qWaitFor([&window] { return window.View().Canvas().Shown() != nullptr; }));
+  window.show();
+  QApplication::processEvents();
+  const ReliefCanvas& canvas = window.View().Canvas();
+  EXPECT_NE(canvas.TextAt(QPointF(canvas.width() / 2.0, canvas.height() / 2.0)), "");
+}
+
 }  // namespace
 }  // namespace tervane::relief_window_test
