@@ -7,6 +7,7 @@
 #include <map>
 #include <optional>
 #include <unordered_map>
+#include <unordered_set>
 #include <utility>
 
 #include <fmt/format.h>
@@ -206,20 +207,35 @@ class Check {
  public:
   Check(const EditedSection& edited, std::vector<TextProblem>& problems) : edited_(edited), problems_(problems) {}
 
-  void Sections(KvfSection& held, KvfSection& after) {
-    ForEachChild(after, true, [&](KvfNode& key, int instance) { Key(held, key, instance); });
+  /// What is as it was before the edit is passed over; `before` is null where nothing was.
+  void Sections(KvfSection& held, KvfSection* before, KvfSection& after) {
+    ForEachChild(after, true, [&](KvfNode& key, int instance) {
+      const KvfNode* old =
+          before ? FindKvfNode(*before, true, key.Name(), static_cast<std::size_t>(instance)) : nullptr;
+      if (!old || KvfValuesText(*old) != KvfValuesText(key)) Key(held, key, instance);
+    });
     // Items are numbered anew, and go by their order.
     std::unordered_map<std::string, std::size_t> places;
     std::unordered_map<std::string, std::vector<KvfSection*>> byKind;
     ForEachChild(held, false, [&](KvfNode& section, int /*instance*/) {
       byKind[NumberlessPath(section.Name())].push_back(AsSection(&section));
     });
-    ForEachChild(after, false, [&](KvfNode& section, int /*instance*/) {
+    std::unordered_set<std::string> known;
+    if (before)
+      ForEachChild(*before, false, [&](KvfNode& section, int /*instance*/) {
+        known.insert(NumberlessPath(section.Name()) + TextInside(*AsSection(&section)));
+      });
+    ForEachChild(after, false, [&](KvfNode& section, int instance) {
       const std::string kind = NumberlessPath(section.Name());
+      if (known.contains(kind + TextInside(*AsSection(&section)))) {
+        ++places[kind];
+        return;
+      }
       const std::vector<KvfSection*>& own = byKind[kind];
       const std::size_t place = places[kind]++;
+      KvfNode* old = before ? FindKvfNode(*before, false, section.Name(), static_cast<std::size_t>(instance)) : nullptr;
       if (place < own.size())
-        Sections(*own[place], *AsSection(&section));
+        Sections(*own[place], AsSection(old), *AsSection(&section));
       else
         Tell(section, fmt::format("the setup takes no section {} here", section.Name()));
     });
@@ -319,7 +335,7 @@ TakenText TakeText(CFlowModelDoc& document, const EditedSection& edited) {
   owner->Save(file.get());
   KvfSection* held = AsSection(file->top.firstChild);
   if (held && !isTarget) held = AsSection(held->firstChild);
-  if (held) check.Sections(*held, *now);
+  if (held) check.Sections(*held, old, *now);
   for (const KvfComment& comment : after.comments) check.Tell(comment.line, "a saved setup keeps no comment here");
   std::stable_sort(taken.problems.begin(), taken.problems.end(),
                    [](const TextProblem& a, const TextProblem& b) { return a.line < b.line; });

@@ -16,9 +16,8 @@ struct EditedSection {
   std::vector<PathStep> steps;  ///< To the section, below the target; none for the target.
   std::string_view before;      ///< The text of the whole section as it was shown, from its name to its brace.
   std::string_view after;       ///< As it was edited.
-  int firstLine = 1;            ///< The number of its first line in the text.
-  int firstEdited = 1;          ///< The lines of `after` that were edited, as numbers in the text.
-  int lastEdited = 1;
+  /// The number of its first line, and of the lines of `after` that were edited; problems count as these do.
+  int firstLine = 1, firstEdited = 1, lastEdited = 1;
 };
 
 struct TextProblem {

@@ -31,7 +31,7 @@
 #include "shell/run/document_run.h"
 #include "shell/run/log_view.h"
 #include "shell/run/run_panel.h"
-#include "shell/why_dialog.h"
+#include "shell/text/text_view.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 #include "wqpt/kinetra_specification.h"
@@ -133,6 +133,7 @@ void DocumentFrame::BuildBody() {
   pagePlace_ = new QWidget;
   auto* place = new QVBoxLayout(pagePlace_);
   place->setContentsMargins(0, 0, 0, 0);
+  BuildMiddle();
 
   bottomTabs_ = new QTabWidget;
   bottomTabs_->setDocumentMode(true);
@@ -163,7 +164,7 @@ void DocumentFrame::BuildBody() {
   below->addWidget(bottomTabs_, 1);
 
   rows_ = new QSplitter(Qt::Vertical);
-  rows_->addWidget(pagePlace_);
+  rows_->addWidget(middle_);
   rows_->addWidget(bottom);
   rows_->setStretchFactor(0, 1);
   rows_->setSizes({theme.Scaled(kPageHeight), theme.Scaled(kBottomHeight)});
@@ -217,15 +218,17 @@ CYbSEKvfBase* DocumentFrame::NodeOf(std::uint64_t serial) const {
 
 bool DocumentFrame::GoTo(std::uint64_t serial, const std::string& control) {
   CYbSEKvfBase* node = NodeOf(serial);
+  const CYbSEKvfBase* wanted = node;
   // A node without a page shows on the page of a node above it.
   while (node && !PageClassOf(*node)) node = node->GetParent();
   if (!node) return false;
   if (node->Serial() != current_ || !page_) {
     Commit();
     ShowPage(*node, control);
-  } else if (!control.empty()) {
+  } else if (!control.empty() && !IsTextShown()) {
     page_->FocusOn(control);
   }
+  FollowInText(*wanted, control);
   return true;
 }
 
@@ -317,7 +320,7 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
     above_.push_back(parent->Serial());
   SelectInTrees(current_);
   if (!isGoing_) Remember(current_);
-  if (!control.empty()) page_->FocusOn(control);
+  if (!control.empty() && !IsTextShown()) page_->FocusOn(control);
   emit StateChanged();
 }
 
@@ -352,25 +355,6 @@ void DocumentFrame::Go(int by) {
   emit StateChanged();
 }
 
-void DocumentFrame::ShowWhy(const QString& title, const std::vector<Explanation>& explanations, const QString& yes,
-                            const QString& no) {
-  WhyDialog dialog(title, explanations, yes, no, this);
-  connect(&dialog, &WhyDialog::Chosen, this, [this](quint64 serial, const QString& key) { GoTo(serial, FromQt(key)); });
-  dialog.exec();
-}
-
-void DocumentFrame::ShowWhyHere(quint64 serial) {
-  if (CYbSEKvfBase* node = NodeOf(serial))
-    ShowWhy(tr("Why Is This Here?"), {WhyTakesPart(session_->Document(), *node)}, tr("takes part, since"),
-            tr("takes no part, since"));
-}
-
-void DocumentFrame::ShowWhatIsMissing() {
-  std::vector<Explanation> explanations;
-  for (MissingNode& missing : WhatIsMissing(session_->Document())) explanations.push_back(std::move(missing.why));
-  ShowWhy(tr("What Is Missing?"), explanations, tr("takes part, since"), tr("takes no part. To bring it:"));
-}
-
 std::string DocumentFrame::CurrentPath() const {
   const CYbSEKvfBase* node = NodeOf(current_);
   return node ? PathOf(*node) : std::string();
@@ -387,8 +371,6 @@ void DocumentFrame::LeaveGoneNode() {
   if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));
 }
 
-void DocumentFrame::StartFind() { find_->Start(); }
-
 bool DocumentFrame::OnHelp() { return page_ && page_->Page().OnHelp(); }
 
 void DocumentFrame::StepFinding(int by) {
@@ -399,11 +381,13 @@ void DocumentFrame::StepFinding(int by) {
 void DocumentFrame::FocusNextPane() {
   const QWidget* focus = QApplication::focusWidget();
   const auto holds = [focus](const QWidget* pane) { return focus && (pane == focus || pane->isAncestorOf(focus)); };
-  if (holds(find_) && page_) {
+  if (holds(find_) && IsTextShown()) {
+    text_->Text().setFocus();
+  } else if (holds(find_) && page_) {
     page_->FocusOn({});
     // A page may have nothing that takes the keyboard.
     if (QApplication::focusWidget() == focus) bottomTabs_->currentWidget()->setFocus();
-  } else if (holds(pagePlace_)) {
+  } else if (holds(middle_)) {
     bottomTabs_->currentWidget()->setFocus();
   } else {
     treeTabs_->currentWidget()->setFocus();
@@ -419,6 +403,7 @@ void DocumentFrame::Refresh(int hint) {
   ShowFindings();
   if (page_) LeaveGoneNode();
   if (page_) page_->Sync();
+  text_->Follow();
   if (hint & ~(kDataChanged | kRefreshPlots)) find_->Forget();
   if (session_->NeedsAutosave()) autosave_.start(kAutosaveDelay);
   emit StateChanged();
@@ -438,12 +423,15 @@ void DocumentFrame::FollowFiles() {
 
 void DocumentFrame::Commit() {
   if (page_) page_->Commit();
+  text_->Commit();
 }
 
-void DocumentFrame::Undo() { Step(&EditSession::Undo, &UndoStack::UndoPlace, &UndoStack::UndoName, tr("Undone: %1")); }
+void DocumentFrame::Undo() {
+  if (!text_->UndoTyping()) Step(&EditSession::Undo, &UndoStack::UndoPlace, &UndoStack::UndoName, tr("Undone: %1"));
+}
 
 void DocumentFrame::Redo() {
-  Step(&EditSession::Redo, &UndoStack::RedoPlace, &UndoStack::RedoName, tr("Done again: %1"));
+  if (!text_->RedoTyping()) Step(&EditSession::Redo, &UndoStack::RedoPlace, &UndoStack::RedoName, tr("Done again: %1"));
 }
 
 void DocumentFrame::Step(bool (EditSession::*step)(), StepPlace (UndoStack::*placeOf)() const,

@@ -33,6 +33,7 @@ class PageView;
 class Program;
 class QtHost;
 class RunPanel;
+class TextView;
 
 /// One document in its tab: the trees at the left, the page in the middle, findings and logs below.
 class DocumentFrame : public QWidget, public MessageReceiver {
@@ -65,7 +66,12 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   void Go(int by);
   /// The path of the node that is shown; empty where there is none.
   std::string CurrentPath() const;
+  /// Finds in the tree, or in the text where that is shown.
   void StartFind();
+  /// The text of the setup stands in the place of the page, at the node of the page; the page comes back at the node
+  /// of the cursor.
+  void ShowText(bool isShown);
+  bool IsTextShown() const;
   /// The page's own help; false when it has none.
   bool OnHelp();
   /// What takes no part, and what would bring it.
@@ -87,6 +93,8 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   void RebuildProcessedData();
   void Undo();
   void Redo();
+  bool CanUndo() const;
+  bool CanRedo() const;
   /// A change that a menu makes in a node that has no page.
   void Change(CYbSEKvfBase& node, int hint, const QString& action);
   /// False when it failed; the user has been told why.
@@ -125,6 +133,9 @@ class DocumentFrame : public QWidget, public MessageReceiver {
 
  private:
   void BuildBody();
+  /// The page and, beside it, the text.
+  void BuildMiddle();
+  void FollowInText(const CYbSEKvfBase& node, const std::string& control);
   /// Undoes or redoes a step, and shows what that has changed.
   void Step(bool (EditSession::*step)(), StepPlace (UndoStack::*placeOf)() const,
             std::string (UndoStack::*nameOf)() const, const QString& told);
@@ -174,6 +185,8 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   FindingsView* findings_ = nullptr;
   std::unique_ptr<DocumentRun> run_;
   LogView *log_ = nullptr, *riverLog_ = nullptr;
+  QTabWidget* middle_ = nullptr;
+  TextView* text_ = nullptr;
   QWidget* pagePlace_ = nullptr;
   QPointer<PageView> page_;
   QPointer<Banner> diskBanner_, runBanner_, templateBanner_;

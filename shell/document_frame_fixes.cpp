@@ -1,7 +1,8 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// Quick fixes in a document's window: where files are searched, what is asked before, one step of undo.
+// What a document's window explains, and its quick fixes: where files are searched, what is asked before, one step of
+// undo.
 #include <QApplication>
 #include <QDir>
 #include <QFileDialog>
@@ -12,6 +13,7 @@
 #include "shell/document_frame.h"
 #include "shell/page/page_view.h"
 #include "shell/qt_host.h"
+#include "shell/why_dialog.h"
 #include "shell/widgets/qt_text.h"
 
 namespace tervane {
@@ -111,6 +113,25 @@ void DocumentFrame::Fix(const QString& kindName, const std::vector<SetupFinding>
   session_->UpdateDoc(document.Root(), kTreeRebuilt | kDataChanged, FromQt(TitleOf(*kind)));
   emit Told(plan.values.size() == 1 ? ChangesInWords(plan).front() : tr("%1 values changed").arg(plan.values.size()));
   tellLeft();
+}
+
+void DocumentFrame::ShowWhy(const QString& title, const std::vector<Explanation>& explanations, const QString& yes,
+                            const QString& no) {
+  WhyDialog dialog(title, explanations, yes, no, this);
+  connect(&dialog, &WhyDialog::Chosen, this, [this](quint64 serial, const QString& key) { GoTo(serial, FromQt(key)); });
+  dialog.exec();
+}
+
+void DocumentFrame::ShowWhyHere(quint64 serial) {
+  if (CYbSEKvfBase* node = NodeOf(serial))
+    ShowWhy(tr("Why Is This Here?"), {WhyTakesPart(session_->Document(), *node)}, tr("takes part, since"),
+            tr("takes no part, since"));
+}
+
+void DocumentFrame::ShowWhatIsMissing() {
+  std::vector<Explanation> explanations;
+  for (MissingNode& missing : WhatIsMissing(session_->Document())) explanations.push_back(std::move(missing.why));
+  ShowWhy(tr("What Is Missing?"), explanations, tr("takes part, since"), tr("takes no part. To bring it:"));
 }
 
 }  // namespace tervane

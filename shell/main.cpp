@@ -38,6 +38,7 @@ using namespace tervane;
 
 struct Typed {
   std::vector<std::string> files;
+  bool text = false;
   std::string page, size, screenshot, appearance, dialog, relief, report;
   ReportOptions reported;
   std::vector<std::string> answers;
@@ -177,6 +178,7 @@ int Run(const Typed& typed, QApplication& application) {
                    answer.c_str());
       if (isPicture) return 2;
     }
+  if (typed.text && window.Frame()) window.Frame()->ShowText(true);
   if (!isPicture) {
     QTimer::singleShot(0, &window, [&window] { window.OfferRecoveries(); });
     return QApplication::exec();
@@ -209,6 +211,7 @@ int main(int argc, char** argv) {
   commandLine.add_option("FILE", typed.files, "Setups (.tvd), libraries (.etv) and data files to open");
   commandLine.add_flag("--edit", typed.isEdit, "Opens data files to be changed, not only to be looked at");
   commandLine.add_option("--page", typed.page, "The node to show, as Climate/PrecipitationRate");
+  commandLine.add_flag("--text", typed.text, "Shows the text of the setup, at that node");
   commandLine
       .add_option(
           "--answer", typed.answers,

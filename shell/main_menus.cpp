@@ -180,15 +180,11 @@ void MainWindow::BuildEditMenu() {
   Command& undo = AddForEditor(
       edit, tr("&Undo"), "undo", QKeySequence::Undo, [](DocumentFrame& frame) { frame.Undo(); },
       [](EditTab& editor) { editor.Undo(); });
-  undo.enabled = [this] {
-    return Frame() ? Frame()->Session().Steps().CanUndo() : Editor() && Editor()->File().CanUndo();
-  };
+  undo.enabled = [this] { return Frame() ? Frame()->CanUndo() : Editor() && Editor()->File().CanUndo(); };
   Command& redo = AddForEditor(
       edit, tr("&Redo"), "redo", QKeySequence::Redo, [](DocumentFrame& frame) { frame.Redo(); },
       [](EditTab& editor) { editor.Redo(); });
-  redo.enabled = [this] {
-    return Frame() ? Frame()->Session().Steps().CanRedo() : Editor() && Editor()->File().CanRedo();
-  };
+  redo.enabled = [this] { return Frame() ? Frame()->CanRedo() : Editor() && Editor()->File().CanRedo(); };
   redo.action->setShortcuts({QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_Z), QKeySequence(Qt::CTRL | Qt::Key_Y)});
   undo.action->setObjectName("Undo");
   redo.action->setObjectName("Redo");
@@ -242,6 +238,9 @@ void MainWindow::BuildViewMenu() {
   forward.enabled = [this] { return Frame() && Frame()->CanGo(1); };
   AddForDocument(view, tr("&Overview"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_I),
                  [](DocumentFrame& frame) { GoToImportant(frame, kOverview); });
+  Command& setupText = AddForDocument(view, tr("&Text of the Setup"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_T),
+                                      [](DocumentFrame& frame) { frame.ShowText(!frame.IsTextShown()); });
+  setupText.checked = [this] { return Frame() && Frame()->IsTextShown(); };
   view->addSeparator();
   AddForDocument(view, tr("&Next Finding"), nullptr, QKeySequence(Qt::Key_F8),
                  [](DocumentFrame& frame) { frame.StepFinding(1); });

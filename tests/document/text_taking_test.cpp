@@ -15,8 +15,6 @@ namespace {
 using test::SavedText;
 using test::SetupText;
 using test::ValueOf;
-using testing::Contains;
-using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 
@@ -159,9 +157,7 @@ TEST(TextTaking, ItemsComeGoAndChangeAndTheOthersStay) {
   EXPECT_EQ(setup.Node("Subcatchments/Subcatchment#2"), lower);
 
   setup.ShowAnew();
-  // The line that tells their number was edited as well as the others, and says two.
-  EXPECT_THAT(Texts(setup.Edit("Subcatchments", setup.Section("Subcatchments/Subcatchment"), "")),
-              Contains(HasSubstr("NO_ZONES stays 1")));
+  EXPECT_THAT(Texts(setup.Edit("Subcatchments", setup.Section("Subcatchments/Subcatchment"), "")), IsEmpty());
   EXPECT_EQ(setup.Node("Subcatchments/Subcatchment"), lower);
 
   setup.ShowAnew();
@@ -175,8 +171,7 @@ TEST(TextTaking, ItemsComeGoAndChangeAndTheOthersStay) {
 TEST(TextTaking, WhatAPageHasChangedMeanwhileStays) {
   EditedSetup setup("section SimSpec {\nsection SimTitle {\nTitle = \"old\"\nDescription = \"old\"\n}\n}");
   setup.Edit("SimSpec/SimTitle", "Title = \"old\"", "Title = \"of the page\"");
-  EXPECT_THAT(Texts(setup.Edit("SimSpec/SimTitle", "Description = \"old\"", "Description = \"typed\"")),
-              ElementsAre(HasSubstr("Title stays \"of the page\"")));
+  EXPECT_THAT(Texts(setup.Edit("SimSpec/SimTitle", "Description = \"old\"", "Description = \"typed\"")), IsEmpty());
   EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "of the page");
   EXPECT_EQ(setup.Value("SimSpec/SimTitle:Description"), "typed");
 }
