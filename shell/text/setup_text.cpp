@@ -183,15 +183,23 @@ void SetupText::FillOn() {
 
 void SetupText::OnContentsChange(int position, int /*removed*/, int added) {
   if (isOurs_) return;
-  const int count = document()->blockCount();
+  const int count = document()->blockCount(), given = outline_.LineCount();
   const int first = document()->findBlock(position).blockNumber();
-  const QTextBlock last = document()->findBlock(position + added);
-  const int tail = last.isValid() ? count - 1 - last.blockNumber() : 0;
-  keptTop_ = isEdited_ ? std::min(keptTop_, first) : first;
+  const QTextBlock end = document()->findBlock(position + added);
+  const int last = end.isValid() ? end.blockNumber() : count - 1;
+  // Lines that were coloured count as changed in the document, and are told with the next that is.
+  const auto isGiven = [this](int line, int givenLine) {
+    return FromQt(document()->findBlockByNumber(line).text()) == outline_.Line(givenLine);
+  };
+  int top = first;
+  while (top <= last && top < given && isGiven(top, top)) ++top;
+  int tail = count - 1 - last;
+  while (tail < count - top && tail < given - top && isGiven(count - 1 - tail, given - 1 - tail)) ++tail;
+  if (!isEdited_ && top == count && top == given) return;
+  keptTop_ = isEdited_ ? std::min(keptTop_, top) : top;
   keptTail_ = isEdited_ ? std::min(keptTail_, tail) : tail;
-  keptTail_ = std::min({keptTail_, count - keptTop_, outline_.LineCount() - keptTop_});
+  keptTail_ = std::min({keptTail_, count - keptTop_, given - keptTop_});
   isEdited_ = true;
-  lastLine_ = textCursor().blockNumber();
   emit Typed();
 }
 

@@ -90,7 +90,7 @@ TextView::TextView(EditSession& session, QWidget* parent)
   });
   connect(problems_, &QListWidget::itemClicked, problems_, &QListWidget::itemActivated);
   checking_.setSingleShot(true);
-  connect(&checking_, &QTimer::timeout, this, &TextView::CheckTyping);
+  connect(&checking_, &QTimer::timeout, this, &TextView::LookAtTyping);
   connect(text_, &SetupText::Typed, this, [this] {
     checking_.start(kCheckDelay);
     if (!std::exchange(wasTyping_, true)) emit TypingChanged();
@@ -188,7 +188,7 @@ std::vector<TextProblem> OutsideOfAll(const SetupText::Edited& lines) {
 
 }  // namespace
 
-void TextView::CheckTyping() {
+void TextView::LookAtTyping() {
   if (!text_->IsEdited() || text_->document()->revision() == triedRevision_) return;
   SetupText::Edited lines;
   const EditedSection edited = EditedNow(lines);

@@ -39,6 +39,8 @@ class TextView : public QWidget {
   };
   Place PlaceAtCursor() const;
 
+  /// Tells what is wrong with what is being typed; called when the keys pause.
+  void LookAtTyping();
   /// Has the setup take what was typed; what it cannot take stays, with the reason below the text.
   void Commit();
   /// Something was typed that the setup has not taken.
@@ -61,7 +63,6 @@ class TextView : public QWidget {
  private:
   EditedSection EditedNow(SetupText::Edited& lines) const;
   TextOutline OutlineNow(std::string& error) const;
-  void CheckTyping();
   void ShowProblems(std::vector<TextProblem> problems);
   void ShowStatus();
   void FindOn(bool isBackward);
