@@ -49,6 +49,7 @@ constexpr CommandFile kFiles[] = {
     {OfferPageCommand, {"page"}},
     {OfferGroundCommands},
     {OfferValueCommands, {"get", "set"}},
+    {OfferNotesCommands},
     {OfferConvertCommand, {"convert"}},
     {OfferDiffCommand, {"diff"}},
     {OfferClimateCommand},

@@ -51,6 +51,7 @@ void OfferWhyCommand(CommandOffers& offers);
 void OfferPageCommand(CommandOffers& offers);
 void OfferGroundCommands(CommandOffers& offers);
 void OfferValueCommands(CommandOffers& offers);
+void OfferNotesCommands(CommandOffers& offers);
 void OfferDiffCommand(CommandOffers& offers);
 void OfferClimateCommand(CommandOffers& offers);
 void OfferKeysCommand(CommandOffers& offers);

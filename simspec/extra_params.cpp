@@ -2,7 +2,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "simspec/extra_params.h"
 
+#include <fmt/format.h>
+
 #include "simspec/basic_parameters.h"
+#include "simspec/review_notes.h"
 
 namespace tervane {
 
@@ -49,6 +52,16 @@ void CExtraParamsItemKvf::ExchangeState(KeyExchange& keys) {
 int CExtraParamsKvf::GetSectionUsed() const {
   const auto* basics = Important(kBasicParameters);
   return basics ? basics->UsesExtraParams : 1;
+}
+
+int CExtraParamsKvf::ValidateData() {
+  for (int number = 1; number <= GetItemCount(); ++number) {
+    ReviewNote note;
+    std::string problem;
+    if (HoldsReviewNote(*GetItem(number)) && !ReadReviewNote(*GetItem(number), note, problem))
+      AddWarning(fmt::format("{} cannot be read, and is kept as it is", GetItem(number)->Name), {}, problem);
+  }
+  return 1;
 }
 
 std::string CExtraParamsKvf::GetItemName(int number) const {

@@ -41,6 +41,8 @@ class CExtraParamsKvf : public CYbSEKvfListBase<CExtraParamsItemKvf>, public CYb
 
   int GetSectionUsed() const override;
   std::string GetItemName(int number) const override;
+  /// Tells of review notes that cannot be read.
+  int ValidateData() override;
 
  protected:
   void ExchangeKeys(KeyExchange& keys) override { keys.Count("NoOfParams", *this); }

@@ -19,6 +19,7 @@
 #include "platform/text.h"
 #include "platform/version.h"
 #include "simspec/basic_parameters.h"
+#include "simspec/review_notes.h"
 #include "simspec/titles.h"
 #include "spatial/coverage.h"
 #include "spatial/domain.h"
@@ -35,6 +36,7 @@ constexpr ReportSectionKind kSections[] = {
     {"coverage", "Data coverage", "whether the data cover simulation and domain, and forcings year by year",
      ReportCoverage},
     {"findings", "Findings and notes", "what a check finds", ReportFindings},
+    {"notes", "Review notes", "what reviewers have noted, with answers and states", ReportNotes},
     {"run", "The latest run", "its passport: when, by whom, of which files", ReportRun},
 };
 
@@ -145,6 +147,23 @@ void ReportFindings(ReportContext& context, std::vector<ReportBlock>& blocks) {
     table.rows.push_back({std::string(KindName(first.kind)), std::move(place), context.dates.In(group.Text())});
   }
   blocks.push_back(std::move(table));
+}
+
+void ReportNotes(ReportContext& context, std::vector<ReportBlock>& blocks) {
+  CYbSEKvfGlobalBase& root = context.document.Root();
+  const auto* list = root.Child<CExtraParamsKvf>();
+  if (!list) return;
+  PlaceNames names(context.document);
+  ReportTable table{{"State", "Place", "Note", "By"}, {}};
+  for (const ReviewNote& note : ReviewNotesOf(*list)) {
+    CYbSEKvfBase* node = NodeOfReviewNote(root, note);
+    std::string place = note.place.empty() ? "The whole setup" : fmt::format("{} (gone)", note.place);
+    if (node && node != &root) place = names.Of(*node, PathOf(*node), ParseSetupPath(note.place).key.name);
+    const auto by = [&](const auto& said) { return fmt::format("{}, {}", said.author, context.dates.In(said.date)); };
+    table.rows.push_back({std::string(NameOf(note.state)), std::move(place), note.text, by(note)});
+    for (const ReviewAnswer& answer : note.answers) table.rows.push_back({"answer", {}, answer.text, by(answer)});
+  }
+  if (!table.rows.empty()) blocks.push_back(std::move(table));
 }
 
 void ReportCoverage(ReportContext& context, std::vector<ReportBlock>& blocks) {

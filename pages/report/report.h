@@ -84,6 +84,7 @@ void ReportModel(ReportContext& context, std::vector<ReportBlock>& blocks);
 void ReportDomain(ReportContext& context, std::vector<ReportBlock>& blocks);
 void ReportValues(ReportContext& context, std::vector<ReportBlock>& blocks);
 void ReportInputs(ReportContext& context, std::vector<ReportBlock>& blocks);
+void ReportNotes(ReportContext& context, std::vector<ReportBlock>& blocks);
 void ReportCoverage(ReportContext& context, std::vector<ReportBlock>& blocks);
 void ReportFindings(ReportContext& context, std::vector<ReportBlock>& blocks);
 void ReportRun(ReportContext& context, std::vector<ReportBlock>& blocks);
