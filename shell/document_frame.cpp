@@ -151,6 +151,7 @@ void DocumentFrame::BuildBody() {
     session_->UpdateDoc(*node, kTreeRebuilt | kDataChanged, mend.text);
   });
   bottomTabs_->addTab(findings_, tr("Findings"));
+  BuildNotes();
   log_ =
       new LogView(run_->Log(), tr("What happens to this document, and what an engine that runs it says, stands here."));
   log_->SetFile([this] { return run_->LogFile(); });
@@ -308,6 +309,9 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
             tr("can be changed, since"), tr("cannot be changed, since"));
   });
   OfferFixesOnPage();
+  ShowNotesOnPage();
+  connect(page_, &PageView::NoteWanted, this,
+          [this](quint64 serial, const QString& key) { AddNote(serial, FromQt(key)); });
   connect(page_, &PageView::UnitChosen, this, [this](int itemType, int unit) {
     program_.ChooseUnit(itemType, unit);
     page_->Sync();
@@ -401,6 +405,7 @@ void DocumentFrame::Refresh(int hint) {
   const auto* settings = root.Important(kViewSettings);
   for (NodeTree* tree : trees_) tree->Sync(root, !settings || settings->ShowValidationIcons != 0);
   ShowFindings();
+  ShowNotes();
   if (page_) LeaveGoneNode();
   if (page_) page_->Sync();
   text_->Follow();

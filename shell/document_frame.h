@@ -29,6 +29,7 @@ class FindPanel;
 class FindingsView;
 class LogView;
 class NodeTree;
+class NotesView;
 class PageView;
 class Program;
 class QtHost;
@@ -107,6 +108,10 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   /// Tries a kind of fix for these findings, or for all that it is for where there are none: asks where files are to be
   /// searched and whether many values are to be changed, and changes them in one step.
   void Fix(const QString& kind, const std::vector<SetupFinding>& findings);
+  /// Asks for a review note at a node, or at a key of it, and adds it.
+  void AddNote(std::uint64_t serial, const std::string& key);
+  /// The same at the control that has the keyboard, else at the page.
+  void AddNoteHere();
   void Log(const QString& line);
   /// Makes all anew that was computed from colours and sizes.
   void Redraw();
@@ -159,6 +164,10 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   void ShowLoadReport();
   void FollowRun();
   void ShowFindings();
+  void BuildNotes();
+  /// Shows the notes in their list, in the trees and on the page.
+  void ShowNotes();
+  void ShowNotesOnPage();
   void OnRunEnd(bool isDone, bool wasFound);
   /// The first error that the engine has told in its latest run, as a sentence with its place and how many there are.
   struct ToldError {
@@ -183,6 +192,8 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   std::vector<NodeTree*> trees_;
   FindPanel* find_ = nullptr;
   FindingsView* findings_ = nullptr;
+  NotesView* notes_ = nullptr;
+  std::map<std::pair<std::uint64_t, std::string>, QString> noted_;  ///< Notes that are not done, by node and key.
   std::unique_ptr<DocumentRun> run_;
   LogView *log_ = nullptr, *riverLog_ = nullptr;
   QTabWidget* middle_ = nullptr;

@@ -24,7 +24,7 @@ namespace {
 
 constexpr int kMostOpen = 12;  ///< A branch of more entries begins closed, and tells their number.
 
-enum ItemRole { kSerialRole = Qt::UserRole, kPathRole, kMarkRole, kShownMarkRole, kSharedRole };
+enum ItemRole { kSerialRole = Qt::UserRole, kPathRole, kMarkRole, kShownMarkRole, kSharedRole, kNotesRole };
 enum Mark { kNoMark, kWarning, kError };
 
 /// Rows whose marks stand at their right end, so that no title moves when one comes.
@@ -36,6 +36,13 @@ class MarkedRowDelegate : public RowDelegate {
   void initStyleOption(QStyleOptionViewItem* option, const QModelIndex& index) const override {
     RowDelegate::initStyleOption(option, index);
     option->decorationPosition = QStyleOptionViewItem::Right;
+  }
+  void paint(QPainter* painter, const QStyleOptionViewItem& option, const QModelIndex& index) const override {
+    RowDelegate::paint(painter, option, index);
+    if (index.data(kNotesRole).toInt() == 0) return;
+    // Beside the mark of findings, which has the end of the row.
+    const int size = Theme::Get().Scaled(14), right = option.rect.right() - 2 * size;
+    Theme::Get().Icon("review").paint(painter, right - size / 2, option.rect.center().y() - size / 2, size, size);
   }
 };
 
@@ -137,6 +144,16 @@ void NodeTree::Sync(CYbSEKvfGlobalBase& root, bool showMarks) {
   for (QTreeWidgetItem* item : items_) ShowMark(item);
 }
 
+void NodeTree::ShowNotes(const std::map<std::uint64_t, int>& counts) {
+  for (std::size_t i = 0; i < items_.size() && i < entries_.size(); ++i) {
+    const auto found = counts.find(entries_[i].serial);
+    const int count = found == counts.end() ? 0 : found->second;
+    if (items_[i]->data(0, kNotesRole).toInt() == count) continue;
+    items_[i]->setData(0, kNotesRole, count);
+    items_[i]->setData(0, Qt::AccessibleDescriptionRole, count ? tr("%n review note(s)", nullptr, count) : QString());
+  }
+}
+
 bool NodeTree::BeginsClosed(const QTreeWidgetItem& item) { return item.childCount() > kMostOpen; }
 
 void NodeTree::ShowMark(QTreeWidgetItem* item) const {
@@ -224,6 +241,7 @@ void NodeTree::contextMenuEvent(QContextMenuEvent* event) {
   if (const QTreeWidgetItem* item = itemAt(event->pos())) {
     menu.addAction(tr("&Copy Path"), this,
                    [item] { QApplication::clipboard()->setText(item->data(0, kPathRole).toString()); });
+    menu.addAction(tr("Add &Note…"), this, [this, item] { emit NoteWanted(item->data(0, kSerialRole).toULongLong()); });
     menu.addAction(tr("&Why Is This Here?"), this,
                    [this, item] { emit WhyAsked(item->data(0, kSerialRole).toULongLong()); });
     menu.addSeparator();

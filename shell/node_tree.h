@@ -5,6 +5,7 @@
 #include <QStringList>
 #include <QTreeWidget>
 #include <cstdint>
+#include <map>
 #include <set>
 #include <vector>
 
@@ -22,6 +23,8 @@ class NodeTree : public QTreeWidget {
 
   /// Follows the tree of nodes; what was open stays open, what was selected stays selected.
   void Sync(CYbSEKvfGlobalBase& root, bool showMarks);
+  /// Marks the entries of these nodes, each with its number of review notes.
+  void ShowNotes(const std::map<std::uint64_t, int>& counts);
   /// Selects the node's entry without telling; true when it has one.
   bool Select(std::uint64_t serial);
   /// Of the entries that stand in this tree alone: whether there is one, whether one is selected.
@@ -38,6 +41,8 @@ class NodeTree : public QTreeWidget {
   void NodeChosen(quint64 serial);
   /// The Tab key leads on.
   void TabbedOn();
+  /// The user wants to note something at a node.
+  void NoteWanted(quint64 serial);
   /// The user asks why a node takes part.
   void WhyAsked(quint64 serial);
 

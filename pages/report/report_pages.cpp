@@ -18,6 +18,7 @@
 #include "pages/report/report_pictures.h"
 #include "pages/tree_entries.h"
 #include "platform/text.h"
+#include "simspec/review_notes.h"
 #include "spatial/domain.h"
 
 namespace tervane {
@@ -91,6 +92,8 @@ class PageDifferences {
       const auto isCheck = [&](int column) { return table.Kind(row, column) == CellKind::Check; };
       // A list of all that may be chosen tells what is chosen.
       if (!columns.empty() && isCheck(columns.front()) && table.Cell(row, columns.front()) == "0") continue;
+      // Review notes, which are kept among the extra parameters, have a section of their own.
+      if (!columns.empty() && table.Cell(row, columns.front()).starts_with(kReviewNotePrefix)) continue;
       if (told.rows.size() >= kMostRows) {
         ++more;
         continue;

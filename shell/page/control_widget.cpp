@@ -90,6 +90,20 @@ void ControlWidget::AddTo(QMenu& menu) {
   menu.addAction(tr("Copy &Path of This Key"), this, [path] { QApplication::clipboard()->setText(path); });
 }
 
+void ControlWidget::ShowNotes(const QString& notes) {
+  if (!noteMark_ && (notes.isEmpty() || !row_)) return;
+  if (!noteMark_) {
+    const int size = Theme::Get().Scaled(kMarkSize);
+    noteMark_ = new QLabel;
+    noteMark_->setFixedSize(size, size);
+    noteMark_->setPixmap(Theme::Get().Icon("review").pixmap(size, size));
+    row_->insertWidget(row_->indexOf(mark_), noteMark_);
+  }
+  noteMark_->setToolTip(notes);
+  noteMark_->setAccessibleName(notes.isEmpty() ? QString() : tr("Review note: %1").arg(notes));
+  noteMark_->setVisible(!notes.isEmpty());
+}
+
 void ControlWidget::ShowDeclared(const QString& toolTip, std::optional<std::string> reset) {
   reset_ = std::move(reset);
   if (label_) label_->setToolTip(toolTip);
@@ -120,6 +134,7 @@ QBoxLayout* ControlWidget::MakeField(QWidget* editor, bool grows) {
   mark_->setFixedSize(size, size);
   mark_->hide();
   row->addWidget(mark_);
+  row_ = row;
   if (!grows) row->addStretch();
   column->addLayout(row);
   message_ = new QLabel;

@@ -18,6 +18,7 @@
 #include "forms/page.h"
 
 class QBoxLayout;
+class QHBoxLayout;
 class QMenu;
 
 namespace tervane {
@@ -50,6 +51,8 @@ class ControlWidget : public QObject {
   virtual QWidget* FocusTarget() const { return nullptr; }
   /// Takes what the declaration tells of the key; `reset` is what gives it its default, nothing where it has it.
   void ShowDeclared(const QString& toolTip, std::optional<std::string> reset);
+  /// Shows review notes at the key, as a mark behind the field; none where the text is empty.
+  void ShowNotes(const QString& notes);
   /// Adds the commands on the value to a menu.
   void AddTo(QMenu& menu);
   /// A value that the page has not taken gives way to the node's.
@@ -95,7 +98,8 @@ class ControlWidget : public QObject {
   Control& control_;
   QPointer<QWidget> label_, field_;
   QPointer<QWidget> unit_;  ///< A label, or a button where the user may choose.
-  QPointer<QLabel> mark_, message_;
+  QPointer<QLabel> mark_, message_, noteMark_;
+  QPointer<QHBoxLayout> row_;  ///< Of the field: the editor and what stands behind it.
   QPointer<QWidget> editor_;
   QPointer<QWidget> dot_;  ///< Marks a value that is not the default.
   std::optional<std::string> reset_;

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/page/page_view.h"
 
+#include <QApplication>
 #include <QContextMenuEvent>
 #include <QGridLayout>
 #include <QGroupBox>
@@ -137,6 +138,12 @@ void PageView::Build(const QString& placeText, const QString& path) {
   findings_->hide();
   connect(findings_, &QLabel::linkActivated, this, &PageView::FollowFixLink);
   all->addWidget(findings_);
+  noted_ = new QLabel;
+  noted_->setWordWrap(true);
+  noted_->setTextFormat(Qt::RichText);
+  noted_->setContentsMargins(margin, theme.Scaled(2), margin, theme.Scaled(6));
+  noted_->hide();
+  all->addWidget(noted_);
   AlignLabels();
   Sync();
   // What is hidden before it was ever shown leaves the sizes that the layouts above it know.
@@ -390,6 +397,7 @@ void PageView::Sync() {
   if (split_ && isVisible()) PlacePlots();
   SyncStretch();
   SyncFindings();
+  SyncNotes();
 }
 
 void PageView::SyncFindings() {
@@ -422,6 +430,31 @@ void PageView::SyncFindings() {
   if (count > kMostFindings) lines += "<div>" + tr("and %n more", nullptr, count - kMostFindings) + "</div>";
   findings_->setText(lines);
   findings_->setVisible(count > 0);
+}
+
+void PageView::ShowNotes(NotesAt notesAt) {
+  notesAt_ = std::move(notesAt);
+  SyncNotes();
+}
+
+void PageView::SyncNotes() {
+  if (!notesAt_ || !ownPage_) return;
+  for (const auto& widget : widgets_) {
+    const Control& control = widget->Described();
+    if (control.node && !control.key.empty()) widget->ShowNotes(notesAt_(*control.node, control.key));
+  }
+  const QString ofPage = notesAt_(page_.Node(), {}).toHtmlEscaped().replace("\n", "<br>");
+  noted_->setText(QString("<b>%1</b>&nbsp; %2").arg(tr("Note"), ofPage));
+  noted_->setVisible(!ofPage.isEmpty());
+}
+
+std::pair<std::uint64_t, std::string> PageView::KeyWithFocus() const {
+  const QWidget* focus = QApplication::focusWidget();
+  for (const auto& widget : widgets_)
+    if (const Control& control = widget->Described();
+        control.node && focus && widget->Field() && (widget->Field() == focus || widget->Field()->isAncestorOf(focus)))
+      return {control.node->Serial(), control.key};
+  return {};
 }
 
 void PageView::OfferFixes(FixOf fixOf) {
@@ -505,6 +538,10 @@ void PageView::contextMenuEvent(QContextMenuEvent* event) {
     if (!control.IsEnabled() && !control.enabledWhen.IsAlways())
       menu.addAction(tr("&Why Is This Grey?"), this, [this, &control] { emit WhyAsked(&control); });
     widget->AddTo(menu);
+    if (control.node && !control.key.empty())
+      menu.addAction(tr("Add &Note…"), this, [this, &control] {
+        emit NoteWanted(control.node->Serial(), QString::fromStdString(control.key));
+      });
     if (menu.isEmpty()) continue;
     menu.exec(event->globalPos());
     return;

@@ -49,6 +49,11 @@ class PageView : public QWidget {
   /// What fixes a finding, as a link behind it; empty where nothing does.
   using FixOf = std::function<QString(CYbSEKvfBase& node, const Finding& finding)>;
   void OfferFixes(FixOf fixOf);
+  /// The review notes at a key, or with an empty key at a node itself; empty where there is none.
+  using NotesAt = std::function<QString(const CYbSEKvfBase& node, const std::string& key)>;
+  void ShowNotes(NotesAt notesAt);
+  /// The node and key of the control that has the keyboard; 0 where none has.
+  std::pair<std::uint64_t, std::string> KeyWithFocus() const;
   /// Texts that were not taken give way to what the node holds.
   void DropRefused();
 
@@ -56,6 +61,8 @@ class PageView : public QWidget {
   void UnitChosen(int itemType, int unit);
   /// The user asks why a control cannot be changed.
   void WhyAsked(const Control* control);
+  /// The user wants to note something at a key.
+  void NoteWanted(quint64 serial, const QString& key);
   /// The user has followed the link behind a finding.
   void FixAsked(quint64 serial, const Finding& finding);
 
@@ -80,6 +87,7 @@ class PageView : public QWidget {
   void SyncStretch();
   void AlignLabels();
   void SyncFindings();
+  void SyncNotes();
   void FollowFixLink(const QString& link);
   /// The control of a key, a label or a name of `NameOf`; one that is shown if there is one. Null when there is none.
   ControlWidget* Find(const std::string& name) const;
@@ -112,6 +120,8 @@ class PageView : public QWidget {
   int neededByForm_ = 0;  ///< The least width in which nothing of it is cut.
   QBoxLayout* content_ = nullptr;
   QLabel* findings_;
+  QLabel* noted_;
+  NotesAt notesAt_;
   FixOf fixOf_;
   /// What the links behind findings stand for, by their numbers; nodes by serial, since they may go.
   std::vector<std::pair<std::uint64_t, Finding>> linked_;

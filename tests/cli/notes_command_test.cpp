@@ -37,9 +37,10 @@ TEST(NotesCommand, NotesAreAddedAnsweredClosedAndRemoved) {
   EXPECT_STREQ(json[0]["answers"][0]["text"].GetString(), "In January");
   EXPECT_TRUE(json[0]["isThere"].GetBool());
   EXPECT_THAT(Tervane({"notes", "list", setup, "--csv"}).out, HasSubstr("\"Climate:SM\",\"answered\",\"Anna\""));
-  const auto report = Tervane({"report", setup, "-o", folder.File("r.html"), "--sections", "notes"});
+  const auto report = Tervane({"report", setup, "-o", folder.File("r.html"), "--sections", "notes,values"});
   EXPECT_EQ(report.status, 0) << report.err;
-  EXPECT_THAT(ReadFile(folder.File("r.html")), testing::AllOf(HasSubstr("Does it snow?"), HasSubstr("In January")));
+  EXPECT_THAT(ReadFile(folder.File("r.html")),
+              testing::AllOf(HasSubstr("Does it snow?"), HasSubstr("In January"), Not(HasSubstr("Review note "))));
 
   EXPECT_EQ(Tervane({"notes", "state", setup, number, "done"}).status, 0);
   EXPECT_THAT(Tervane({"notes", "list", setup}).out, HasSubstr(number + ": done"));
