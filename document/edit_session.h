@@ -52,6 +52,8 @@ class EditSession {
   /// `control` is the name of the control on the node's page in which it was done, if it was in one.
   void UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& action, const void* source = nullptr,
                  std::string control = {});
+  /// What was changed since is a part of the latest step; nobody is told.
+  void JoinStep() { undo_->Join(); }
   bool Undo();
   bool Redo();
   const UndoStack& Steps() const { return *undo_; }

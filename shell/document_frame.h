@@ -168,6 +168,8 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   /// Shows the notes in their list, in the trees and on the page.
   void ShowNotes();
   void ShowNotesOnPage();
+  /// Gives notes the new places of nodes that were moved or renamed by the latest step, as a part of it.
+  void FollowNotedNodes();
   void OnRunEnd(bool isDone, bool wasFound);
   /// The first error that the engine has told in its latest run, as a sentence with its place and how many there are.
   struct ToldError {
@@ -193,6 +195,7 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   FindPanel* find_ = nullptr;
   FindingsView* findings_ = nullptr;
   NotesView* notes_ = nullptr;
+  std::map<std::string, std::uint64_t> noteNodes_;  ///< Where each note stood when it was last looked at.
   std::map<std::pair<std::uint64_t, std::string>, QString> noted_;  ///< Notes that are not done, by node and key.
   std::unique_ptr<DocumentRun> run_;
   LogView *log_ = nullptr, *riverLog_ = nullptr;

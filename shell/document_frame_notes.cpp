@@ -37,7 +37,30 @@ void DocumentFrame::AddNoteHere() {
   AddNote(serial ? serial : current_, key);
 }
 
+void DocumentFrame::FollowNotedNodes() {
+  CYbSEKvfGlobalBase& root = session_->Document().Root();
+  auto* list = root.Child<CExtraParamsKvf>();
+  bool hasFollowed = false;
+  for (ReviewNote& note : ReviewNotesOf(*list)) {
+    if (note.place.empty()) continue;
+    CYbSEKvfBase* found = NodeOfReviewNote(root, note);
+    const auto known = noteNodes_.find(note.name);
+    // Undo and redo bring the note back with its node; a node that is no more leaves its notes behind.
+    if (known != noteNodes_.end()) {
+      if (!found || found->Serial() != known->second)
+        if (CYbSEKvfBase* node = NodeOf(known->second)) found = node;
+      if (found && FollowNode(note, *found)) {
+        PutReviewNote(*list, note);
+        hasFollowed = true;
+      }
+    }
+    if (found) noteNodes_[note.name] = found->Serial();
+  }
+  if (hasFollowed) session_->JoinStep();
+}
+
 void DocumentFrame::ShowNotes() {
+  FollowNotedNodes();
   notes_->Sync();
   const int count = notes_->OpenCount();
   bottomTabs_->setTabText(bottomTabs_->indexOf(notes_), count ? tr("Notes (%1)").arg(count) : tr("Notes"));

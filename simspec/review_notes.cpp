@@ -158,7 +158,16 @@ CYbSEKvfBase* NodeOfReviewNote(CYbSEKvfBase& root, const ReviewNote& note) {
   std::optional<CYbSEKvfBase*> beside;
   for (CYbSEKvfBase* child = above ? above->GetFirstChild() : nullptr; child; child = above->GetNextChild(child))
     if (CallOf(*child) == note.title) beside = beside ? nullptr : child;
-  return beside && *beside ? *beside : there;
+  return beside.value_or(nullptr);
+}
+
+bool FollowNode(ReviewNote& note, CYbSEKvfBase& node) {
+  const PathStep key = ParseSetupPath(note.place).key;
+  ReviewNote now = NewReviewNoteAt(node, key.name);
+  if (now.place == note.place && now.title == note.title) return false;
+  note.place = std::move(now.place);
+  note.title = std::move(now.title);
+  return true;
 }
 
 ReviewNote NewReviewNoteAt(CYbSEKvfBase& node, std::string_view key) {

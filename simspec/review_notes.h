@@ -54,9 +54,11 @@ bool RemoveReviewNote(CExtraParamsKvf& list, std::string_view name);
 /// The notes as a table for other programs, separated by commas, answers below their notes.
 std::string ReviewNotesAsCsv(const std::vector<ReviewNote>& notes);
 
-/// The node at which a note stands: that of its path where it is called so, else the one beside it that is, else
-/// whatever is at the path. Null where there is none: its place is gone.
+/// The node at which a note stands: that of its path where it is called so, else the only one beside it that is. Null
+/// where there is none: its place is gone, or was given another name where nobody followed it.
 CYbSEKvfBase* NodeOfReviewNote(CYbSEKvfBase& root, const ReviewNote& note);
+/// Gives a note the place of its node, which was moved or bears another name now; false where nothing is to be done.
+bool FollowNode(ReviewNote& note, CYbSEKvfBase& node);
 /// A note at a node, or at a key of it, which is yet without text, author and date.
 ReviewNote NewReviewNoteAt(CYbSEKvfBase& node, std::string_view key);
 

@@ -9,6 +9,8 @@
 
 #include <gmock/gmock.h>
 
+#include "core/list.h"
+#include "forms/page_form.h"
 #include "shell/node_tree.h"
 #include "tests/shell/opened_setup.h"
 
@@ -96,6 +98,27 @@ TEST(NotesView, NotesAreAnsweredClosedFilteredAndLeadToTheirPlace) {
   CFlowModelDoc again;
   ASSERT_TRUE(again.OnOpenDocument(setup.Path()));
   EXPECT_EQ(ReviewNotesOf(*again.Root().Child<CExtraParamsKvf>()), setup.View().Notes());
+}
+
+TEST(NotesView, ANoteFollowsAnItemThatIsMovedOrRenamedAndStaysBehindOneThatIsGone) {
+  OpenedSetup setup(
+      "section Species {\nYbSEKvfListItemCount = 2\nNumberOfSpecies = 2\nsection Species_1 {\nName = \"Nitrate\"\n}\n"
+      "section Species_2 {\nName = \"Phosphate\"\n}\n}");
+  auto& view = *setup.Frame().findChild<NotesView*>();
+  CYbSEKvfBase& root = setup.Session().Document().Root();
+  const auto at = [&root](const char* path) { return FindNode(root, ParseSetupPath(path).steps); };
+  view.Add(*at("Species/Species_2"), "Name", "Anna", "which one?");
+  auto* list = dynamic_cast<CYbSEKvfListBaseInterface*>(at("Species"));
+  list->DeleteItem(1, 1);
+  setup.Session().UpdateDoc(*list, kItemDeleted, "Delete Row");
+  EXPECT_EQ(view.Notes().front().place, "Species/Species_1:Name");
+  setup.Session().Undo();
+  EXPECT_EQ(view.Notes().front().place, "Species/Species_2:Name");
+  setup.Session().Redo();
+  list->DeleteItem(1, 1);
+  setup.Session().UpdateDoc(*list, kItemDeleted, "Delete Row");
+  ASSERT_EQ(view.Notes().size(), 1U);
+  EXPECT_EQ(NodeOfReviewNote(root, view.Notes().front()), nullptr);
 }
 
 }  // namespace

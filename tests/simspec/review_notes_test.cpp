@@ -87,6 +87,15 @@ TEST(ReviewNotes, AreFoundAtTheirNodeWhereOthersWereTakenOut) {
   CYbSEKvfBase* upper = FindNode(document.Root(), ParseSetupPath("Subcatchments/Subcatchment").steps);
   const auto kept = upper->GetParent()->RemoveChild(upper);
   EXPECT_EQ(NodeOfReviewNote(document.Root(), note), lower);
+  EXPECT_EQ(NodeOfReviewNote(document.Root(), NoteAt(document, "Subcatchments/Subcatchment", "")), lower);
+  ReviewNote ofUpper = note;
+  ofUpper.place = "Subcatchments/Subcatchment:Name";
+  ofUpper.title = "upper";
+  EXPECT_EQ(NodeOfReviewNote(document.Root(), ofUpper), nullptr) << "another stands in its place now";
+  ReviewNote followed = note;
+  EXPECT_TRUE(FollowNode(followed, *lower));
+  EXPECT_EQ(followed.place, "Subcatchments/Subcatchment:Name");
+  EXPECT_FALSE(FollowNode(followed, *lower));
   const auto alsoKept = lower->GetParent()->RemoveChild(lower);
   EXPECT_EQ(NodeOfReviewNote(document.Root(), note), nullptr);
 }
