@@ -132,6 +132,7 @@ void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& act
     node.Validate();
   if (hint & kFollowsFromStep) {
     undo_->Join();
+    if (journal_) journal_->Take(*document_, action, PathOf(node));
     if (listener_) listener_(hint);
     return;
   }
@@ -139,26 +140,42 @@ void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& act
   // custom result folder, counts as a change all the same.
   if (!undo_->Commit(action, source, std::chrono::steady_clock::now(), {node.Serial(), std::move(control)}))
     document_->SetModified(true);
+  if (journal_) journal_->Take(*document_, action, PathOf(node));
   if (listener_) listener_(hint);
 }
 
-void EditSession::ValidateAllAndNotify() {
+void EditSession::ValidateAllAndNotify(const std::string& action) {
   ++changes_;
   document_->Root().TakeRevalidateAll();
   document_->Root().Validate();
+  if (journal_) journal_->Take(*document_, action, {});
   if (listener_) listener_(kAllHints);
 }
 
 bool EditSession::Undo() {
+  const std::string name = undo_->UndoName();
   if (!undo_->Undo()) return false;
-  ValidateAllAndNotify();
+  ValidateAllAndNotify("Undo " + name);
   return true;
 }
 
 bool EditSession::Redo() {
+  const std::string name = undo_->RedoName();
   if (!undo_->Redo()) return false;
-  ValidateAllAndNotify();
+  ValidateAllAndNotify("Redo " + name);
   return true;
+}
+
+void EditSession::KeepJournal(bool keeps) {
+  if (keeps == KeepsJournal()) return;
+  journal_ = keeps ? std::make_unique<JournalKeeper>(*document_) : nullptr;
+}
+
+std::string EditSession::TakeBack(const JournalStep& step) {
+  std::string problem;
+  if (CYbSEKvfBase* node = TakeBackStep(*document_, step, problem))
+    UpdateDoc(*node, kAllHints, fmt::format("Take Back {}", step.action));
+  return problem;
 }
 
 bool EditSession::IsModified() const { return recovered_ || document_->IsModified() || !undo_->IsSaved(); }
@@ -230,6 +247,7 @@ bool EditSession::SaveAs(const std::string& path) {
   // Of what was written, not of what stands there: another program may have been as quick.
   std::string reason;
   known_ = {std::nullopt, HashText(AutosaveText(reason))};
+  if (journal_) journal_->TakeSave(*document_);
   return true;
 }
 

@@ -14,6 +14,7 @@
 
 #include "core/undo.h"
 #include "document/flow_model_document.h"
+#include "document/journal.h"
 #include "document/recovery.h"
 #include "document/setup_diff.h"
 #include "document/setup_lock.h"
@@ -61,6 +62,16 @@ class EditSession {
   /// Whether a save would change the file: not so after a change that was taken back, or one of what is shown alone.
   bool HasChangesToSave() const;
 
+  // ---- Journal
+
+  /// Whether each step is written into the journal beside the setup. One without a file keeps its steps until it has.
+  void KeepJournal(bool keeps);
+  bool KeepsJournal() const { return journal_ != nullptr; }
+  /// Why the journal cannot be written, told once; the work goes on.
+  std::string TakeJournalTrouble() { return journal_ ? journal_->TakeTrouble() : std::string(); }
+  /// Takes back a step of the journal on its own, as a step of its own; why that cannot be, or nothing.
+  std::string TakeBack(const JournalStep& step);
+
   // ---- The file
 
   bool IsReadOnly() const { return !readOnlyReason_.empty(); }
@@ -98,7 +109,7 @@ class EditSession {
   void TakeLock(const std::string& path);
   /// Ends what loading began.
   void Begin();
-  void ValidateAllAndNotify();
+  void ValidateAllAndNotify(const std::string& action);
   /// What a save would write otherwise than one of that document.
   std::vector<SetupDifference> Differences(const CFlowModelDoc& before) const;
   std::string AutosaveText(std::string& error) const;
@@ -113,6 +124,7 @@ class EditSession {
   std::string recoveryFolder_;
   std::unique_ptr<CFlowModelDoc> document_ = std::make_unique<CFlowModelDoc>();
   std::unique_ptr<UndoStack> undo_;
+  std::unique_ptr<JournalKeeper> journal_;
   Listener listener_;
   SetupLock lock_;
   std::string readOnlyReason_;
