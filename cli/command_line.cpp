@@ -50,6 +50,7 @@ constexpr CommandFile kFiles[] = {
     {OfferGroundCommands},
     {OfferValueCommands, {"get", "set"}},
     {OfferNotesCommands},
+    {OfferJournalCommand},
     {OfferConvertCommand, {"convert"}},
     {OfferDiffCommand, {"diff"}},
     {OfferClimateCommand},

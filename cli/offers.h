@@ -52,6 +52,7 @@ void OfferPageCommand(CommandOffers& offers);
 void OfferGroundCommands(CommandOffers& offers);
 void OfferValueCommands(CommandOffers& offers);
 void OfferNotesCommands(CommandOffers& offers);
+void OfferJournalCommand(CommandOffers& offers);
 void OfferDiffCommand(CommandOffers& offers);
 void OfferClimateCommand(CommandOffers& offers);
 void OfferKeysCommand(CommandOffers& offers);
