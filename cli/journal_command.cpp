@@ -38,7 +38,7 @@ int JournalCommand(const JournalOptions& options, Streams streams) {
   const std::string path = JournalBeside(options.file);
   if (!FileExists(path))
     return Refuse(streams, fmt::format("{}: there is no journal beside this setup; the editor keeps one where it is "
-                                       "asked to (Edit | Keep Journal)",
+                                       "asked to (the tab Journal of its window)",
                                        options.file));
   Journal journal = ReadJournal(path);
   if (!journal.error.empty()) return Refuse(streams, journal.error);

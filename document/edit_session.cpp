@@ -144,6 +144,11 @@ void EditSession::UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& act
   if (listener_) listener_(hint);
 }
 
+void EditSession::JoinStep() {
+  undo_->Join();
+  if (journal_) journal_->Take(*document_, undo_->UndoName(), {});
+}
+
 void EditSession::ValidateAllAndNotify(const std::string& action) {
   ++changes_;
   document_->Root().TakeRevalidateAll();

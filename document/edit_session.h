@@ -54,7 +54,7 @@ class EditSession {
   void UpdateDoc(CYbSEKvfBase& node, int hint, const std::string& action, const void* source = nullptr,
                  std::string control = {});
   /// What was changed since is a part of the latest step; nobody is told.
-  void JoinStep() { undo_->Join(); }
+  void JoinStep();
   bool Undo();
   bool Redo();
   const UndoStack& Steps() const { return *undo_; }

@@ -152,6 +152,7 @@ void DocumentFrame::BuildBody() {
   });
   bottomTabs_->addTab(findings_, tr("Findings"));
   BuildNotes();
+  BuildJournal();
   log_ =
       new LogView(run_->Log(), tr("What happens to this document, and what an engine that runs it says, stands here."));
   log_->SetFile([this] { return run_->LogFile(); });
@@ -406,6 +407,7 @@ void DocumentFrame::Refresh(int hint) {
   for (NodeTree* tree : trees_) tree->Sync(root, !settings || settings->ShowValidationIcons != 0);
   ShowFindings();
   ShowNotes();
+  ShowJournal();
   if (page_) LeaveGoneNode();
   if (page_) page_->Sync();
   text_->Follow();

@@ -27,6 +27,7 @@ namespace tervane {
 class DocumentRun;
 class FindPanel;
 class FindingsView;
+class JournalView;
 class LogView;
 class NodeTree;
 class NotesView;
@@ -78,6 +79,8 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   /// What takes no part, and what would bring it.
   void ShowWhatIsMissing();
   void StepFinding(int by);
+  /// Shows the list of that title below the page; false where there is none.
+  bool ShowBelow(const QString& title);
   /// Puts the keyboard into the next of: tree, page, findings.
   void FocusNextPane();
 
@@ -165,6 +168,9 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   void FollowRun();
   void ShowFindings();
   void BuildNotes();
+  void BuildJournal();
+  /// Shows the journal as it is now, and tells when it cannot be written.
+  void ShowJournal();
   /// Shows the notes in their list, in the trees and on the page.
   void ShowNotes();
   void ShowNotesOnPage();
@@ -195,6 +201,7 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   FindPanel* find_ = nullptr;
   FindingsView* findings_ = nullptr;
   NotesView* notes_ = nullptr;
+  JournalView* journal_ = nullptr;
   std::map<std::string, std::uint64_t> noteNodes_;  ///< Where each note stood when it was last looked at.
   std::map<std::pair<std::uint64_t, std::string>, QString> noted_;  ///< Notes that are not done, by node and key.
   std::unique_ptr<DocumentRun> run_;

@@ -1,12 +1,13 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// Review notes in a document's window: the list, the marks in the tree and on pages.
+// Review notes in a document's window: the list, the marks in the tree and on pages. The journal beside them.
 #include <QTabWidget>
 
 #include "core/path.h"
 #include "pages/place_names.h"
 #include "shell/document_frame.h"
+#include "shell/journal_view.h"
 #include "shell/node_tree.h"
 #include "shell/notes_view.h"
 #include "shell/page/page_view.h"
@@ -84,6 +85,30 @@ void DocumentFrame::ShowNotesOnPage() {
     const auto found = noted_.find({node.Serial(), key});
     return found == noted_.end() ? QString() : found->second;
   });
+}
+
+bool DocumentFrame::ShowBelow(const QString& title) {
+  for (int tab = 0; tab < bottomTabs_->count(); ++tab)
+    if (bottomTabs_->tabText(tab) == title) return bottomTabs_->setCurrentIndex(tab), true;
+  return false;
+}
+
+// ---- Journal
+
+void DocumentFrame::BuildJournal() {
+  journal_ = new JournalView(*session_, host_, program_, [this] { Commit(); });
+  bottomTabs_->addTab(journal_, tr("Journal"));
+  connect(journal_, &JournalView::StepChosen, this,
+          [this](quint64 serial, const QString& key) { GoTo(serial, FromQt(key)); });
+}
+
+void DocumentFrame::ShowJournal() {
+  journal_->Sync();
+  const std::string trouble = session_->TakeJournalTrouble();
+  if (trouble.empty()) return;
+  const QString text = tr("The journal is not kept: %1. What is not in it is written when that is possible again.");
+  Log(text.arg(ToQt(trouble)));
+  ShowBanner(text.arg(ToQt(trouble)), {});
 }
 
 }  // namespace tervane

@@ -39,7 +39,7 @@ using namespace tervane;
 struct Typed {
   std::vector<std::string> files;
   bool text = false;
-  std::string page, size, screenshot, appearance, dialog, relief, report;
+  std::string page, below, size, screenshot, appearance, dialog, relief, report;
   ReportOptions reported;
   std::vector<std::string> answers;
   double zoom = 0;
@@ -179,6 +179,10 @@ int Run(const Typed& typed, QApplication& application) {
       if (isPicture) return 2;
     }
   if (typed.text && window.Frame()) window.Frame()->ShowText(true);
+  if (!typed.below.empty() && window.Frame() && !window.Frame()->ShowBelow(ToQt(typed.below))) {
+    std::fprintf(stderr, "quarzel: %s: there is no list of that title below the page\n", typed.below.c_str());
+    if (isPicture) return 2;
+  }
   if (!isPicture) {
     QTimer::singleShot(0, &window, [&window] { window.OfferRecoveries(); });
     return QApplication::exec();
@@ -212,6 +216,7 @@ int main(int argc, char** argv) {
   commandLine.add_flag("--edit", typed.isEdit, "Opens data files to be changed, not only to be looked at");
   commandLine.add_option("--page", typed.page, "The node to show, as Climate/PrecipitationRate");
   commandLine.add_flag("--text", typed.text, "Shows the text of the setup, at that node");
+  commandLine.add_option("--below", typed.below, "The list to show below the page, as Journal");
   commandLine
       .add_option(
           "--answer", typed.answers,
