@@ -103,6 +103,16 @@ void Measure() {
   };
   step("text view: undo of that", true);
   step("text view: redo of that", false);
+
+  auto& item = *session->Document().Root().Child<CExtraParamsKvf>()->GetItem(kItems / 2);
+  const auto change = [&] {
+    ++item.FloatValue;
+    session->UpdateDoc(item, 1, "Change Value");
+  };
+  const double without = MedianOf(change);
+  session->KeepJournal(true);
+  Report("a value is changed while a journal is kept", MedianOf(change), 1000, "ms");
+  ReportPeer("  without a journal", without, "ms");
 }
 
 }  // namespace

@@ -29,7 +29,14 @@ std::string HashText(std::string_view content) { return fmt::format("{:016x}", H
 
 EditSession::EditSession(std::string recoveryFolder) : recoveryFolder_(std::move(recoveryFolder)) {}
 
-EditSession::~EditSession() { RemoveAutosavesBut({}); }
+EditSession::~EditSession() {
+  RemoveAutosavesBut({});
+  try {
+    if (journal_ && IsModified()) journal_->TakeEvent(*document_, "Close Without Saving");
+  } catch (const std::bad_alloc&) {
+    // The journal lacks its last line; nothing else is left to be done.
+  }
+}
 
 // ---- Opening
 
@@ -252,7 +259,7 @@ bool EditSession::SaveAs(const std::string& path) {
   // Of what was written, not of what stands there: another program may have been as quick.
   std::string reason;
   known_ = {std::nullopt, HashText(AutosaveText(reason))};
-  if (journal_) journal_->TakeSave(*document_);
+  if (journal_) journal_->TakeEvent(*document_, "Save");
   return true;
 }
 

@@ -12,6 +12,10 @@
 
 #include <fmt/chrono.h>
 #include <fmt/format.h>
+// Measurements that link this have RapidJSON compiled in another way: theirs and ours are two.
+#define RAPIDJSON_NAMESPACE tervane::journal_json
+#define RAPIDJSON_NAMESPACE_BEGIN namespace tervane::journal_json {
+#define RAPIDJSON_NAMESPACE_END }
 #include <rapidjson/document.h>
 #include <rapidjson/stringbuffer.h>
 #include <rapidjson/writer.h>
@@ -40,10 +44,10 @@ constexpr std::pair<const char*, std::string JournalChange::*> kChangeTexts[] = 
                                                                                  {"from", &JournalChange::from},
                                                                                  {"to", &JournalChange::to}};
 
-using JsonWriter = rapidjson::Writer<rapidjson::StringBuffer>;
+using JsonWriter = journal_json::Writer<journal_json::StringBuffer>;
 
 void PutText(JsonWriter& writer, const std::string& text) {
-  writer.String(text.data(), static_cast<rapidjson::SizeType>(text.size()));
+  writer.String(text.data(), static_cast<journal_json::SizeType>(text.size()));
 }
 
 template <class Object, class Texts>
@@ -57,7 +61,7 @@ void PutTexts(JsonWriter& writer, const Object& object, const Texts& texts) {
 
 /// False where a member of that name is no text.
 template <class Object, class Texts>
-bool TakeTexts(const rapidjson::Value& value, Object& object, const Texts& texts) {
+bool TakeTexts(const journal_json::Value& value, Object& object, const Texts& texts) {
   for (const auto& [name, member] : texts) {
     const auto found = value.FindMember(name);
     if (found == value.MemberEnd()) continue;
@@ -81,7 +85,7 @@ std::string JournalBeside(const std::string& setup) { return setup + ".journal";
 // ---- Lines
 
 std::string WriteJournalLine(const JournalStep& step) {
-  rapidjson::StringBuffer buffer;
+  journal_json::StringBuffer buffer;
   JsonWriter writer(buffer);
   writer.StartObject();
   PutTexts(writer, step, kStepTexts);
@@ -102,8 +106,8 @@ std::string WriteJournalLine(const JournalStep& step) {
 }
 
 std::optional<JournalStep> ReadJournalLine(std::string_view line, std::string& problem) {
-  rapidjson::Document json;
-  json.Parse<rapidjson::kParseIterativeFlag>(line.data(), line.size());
+  journal_json::Document json;
+  json.Parse<journal_json::kParseIterativeFlag>(line.data(), line.size());
   if (json.HasParseError()) {
     problem = fmt::format("it is no JSON from byte {} on", json.GetErrorOffset() + 1);
     return std::nullopt;
@@ -113,7 +117,7 @@ std::optional<JournalStep> ReadJournalLine(std::string_view line, std::string& p
   if (!json.IsObject() || !TakeTexts(json, step, kStepTexts)) return std::nullopt;
   const auto changes = json.FindMember("changes");
   if (changes == json.MemberEnd() || !changes->value.IsArray()) return std::nullopt;
-  for (const rapidjson::Value& value : changes->value.GetArray()) {
+  for (const journal_json::Value& value : changes->value.GetArray()) {
     JournalChange change;
     if (!value.IsObject() || !TakeTexts(value, change, kChangeTexts)) return std::nullopt;
     if (const auto kind = value.FindMember("kind"); kind != value.MemberEnd()) {
@@ -232,11 +236,11 @@ void JournalKeeper::Take(const CFlowModelDoc& document, std::string action, std:
   Write(document, std::move(step));
 }
 
-void JournalKeeper::TakeSave(const CFlowModelDoc& document) {
+void JournalKeeper::TakeEvent(const CFlowModelDoc& document, std::string action) {
   // Names of files may be told from another folder now.
   known_.reset(document.BuildFile(document.Root().SetupFolder()));
   JournalStep step;
-  step.action = "Save";
+  step.action = std::move(action);
   Write(document, std::move(step));
 }
 

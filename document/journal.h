@@ -73,8 +73,8 @@ class JournalKeeper {
 
   /// Takes what changed since the last call as a step; one without changes is none.
   void Take(const CFlowModelDoc& document, std::string action, std::string page);
-  /// Takes a save.
-  void TakeSave(const CFlowModelDoc& document);
+  /// Takes what has changed no value: a save, or an end without one.
+  void TakeEvent(const CFlowModelDoc& document, std::string action);
   /// What is wrong, told once; the steps that could not be written are tried again with the next one.
   std::string TakeTrouble();
 

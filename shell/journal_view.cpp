@@ -103,9 +103,9 @@ JournalView::JournalView(EditSession& session, Host& host, Program& program, std
   const Theme& theme = Theme::Get();
   for (const auto& [at, width] : {std::pair<int, int>{kJournalTime, 170},
                                   {kJournalUser, 80},
-                                  {kJournalStep, 180},
-                                  {kJournalPlace, 330},
-                                  {kJournalBefore, 130}})
+                                  {kJournalStep, 170},
+                                  {kJournalPlace, 275},
+                                  {kJournalBefore, 120}})
     list_->setColumnWidth(at, theme.Scaled(width));
   connect(list_, &QTreeWidget::itemActivated, this, [this](const QTreeWidgetItem* item) { GoToChange(item); });
   connect(list_, &QTreeWidget::itemClicked, this, [this](const QTreeWidgetItem* item) { GoToChange(item); });

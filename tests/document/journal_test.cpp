@@ -131,6 +131,18 @@ TEST_F(Journalled, EachStepStandsWithItsKeysBeforeAndAfter) {
                                 "Redo Change Title||changed SimSpec/SimTitle:Title \"\">\"first\"", "Save||"));
 }
 
+TEST_F(Journalled, WhatWasNotSavedIsToldAtTheEnd) {
+  SetTitle("first");
+  ASSERT_TRUE(session->Save());
+  Open();
+  EXPECT_EQ(Steps().back().action, "Save");
+  session->KeepJournal(true);
+  SetTitle("second");
+  Open();
+  EXPECT_EQ(Steps().back().action, "Close Without Saving");
+  EXPECT_EQ(Title().Title, "first");
+}
+
 TEST_F(Journalled, NothingIsWrittenUnlessTheUserWishes) {
   session->KeepJournal(false);
   SetTitle("first");
