@@ -298,7 +298,9 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
   };
   auto made = MakePage(*pageClass, node, context);
   if (!made) return;
+  const bool isFirstVisit = node.GetHasBeenTouched() == 0;
   node.Touch();
+  if (isFirstVisit) text_->Follow();
   if (page_) {
     // What the user did in it may have led here: its own code is still to return to.
     page_->hide();

@@ -50,7 +50,8 @@ void DocumentFrame::FollowNotedNodes() {
     if (known != noteNodes_.end()) {
       if (!found || found->Serial() != known->second)
         if (CYbSEKvfBase* node = NodeOf(known->second)) found = node;
-      if (found && FollowNode(note, *found)) {
+      // Undo and redo bring notes to where they stood, and what follows them would be no part of their steps.
+      if (found && !session_->Steps().CanRedo() && FollowNode(note, *found)) {
         PutReviewNote(*list, note);
         hasFollowed = true;
       }

@@ -140,8 +140,15 @@ CExtraParamsKvf& NotesView::List() const { return *session_.Document().Root().Ch
 
 void NotesView::Sync() {
   std::vector<ReviewNote> notes = ReviewNotesOf(List());
-  if (notes == notes_ && notes_.empty()) return;
+  // What a place is called is found on its page, which takes a while: only for what has changed.
+  std::vector<std::uint64_t> nodes;
+  for (const ReviewNote& note : notes) {
+    const CYbSEKvfBase* node = NodeOfReviewNote(session_.Document().Root(), note);
+    nodes.push_back(node ? node->Serial() : 0);
+  }
+  if (notes == notes_ && nodes == nodes_) return;
   notes_ = std::move(notes);
+  nodes_ = std::move(nodes);
   Fill();
 }
 

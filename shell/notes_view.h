@@ -83,6 +83,7 @@ class NotesView : public QWidget {
   Host& host_;
   Program& program_;
   std::vector<ReviewNote> notes_;
+  std::vector<std::uint64_t> nodes_;  ///< Where each of them stands; 0 where its place is gone.
   QComboBox* filter_;
   QTreeWidget* list_;
   QToolButton *answer_, *done_, *remove_, *export_;

@@ -11,6 +11,7 @@
 #include <QPushButton>
 #include <QRadioButton>
 #include <QTabWidget>
+#include <QTextBlock>
 #include <QTimer>
 #include <QToolButton>
 #include <cstdlib>
@@ -18,13 +19,18 @@
 #include <sstream>
 
 #include <gmock/gmock.h>
+#include <malloc.h>
 
 #include "document/flow_model_document.h"
+#include "shell/notes_view.h"
 #include "shell/relief/relief_window.h"
+#include "shell/text/text_view.h"
 #include "tests/shell/opened_setup.h"
 
 namespace tervane::program_test {
 namespace {
+
+using test::OpenedSetup;
 
 int Wanted(const char* variable, int otherwise) {
   const char* told = std::getenv(variable);
@@ -97,7 +103,7 @@ class Monkey {
   std::size_t Any(std::size_t count) { return std::uniform_int_distribution<std::size_t>(0, count - 1)(random_); }
 
   void Step() {
-    switch (Any(12)) {
+    switch (Any(14)) {
       case 0:
       case 1:
       case 2:
@@ -108,6 +114,10 @@ class Monkey {
         return setup_.Frame().Redo();
       case 5:
         return setup_.Frame().Go(Any(2) == 0 ? -1 : 1);
+      case 6:
+        return EditText();
+      case 7:
+        return Note();
       default:
         return ActOnPage();
     }
@@ -123,6 +133,51 @@ class Monkey {
     };
     collect(Document().Root());
     setup_.Frame().GoTo(pages[Any(pages.size())]);
+  }
+
+  /// Changes lines somewhere in the text; what the setup does not take is given up.
+  void EditText() {
+    setup_.Frame().ShowText(true);
+    auto& view = *setup_.Frame().findChild<TextView*>();
+    SetupText& text = view.Text();
+    for (std::size_t edits = 1 + Any(2); edits > 0; --edits) {
+      const auto line = static_cast<int>(Any(static_cast<std::size_t>(text.document()->blockCount())));
+      text.GoToLine(line);
+      QTextCursor cursor = text.textCursor();
+      const auto lines = static_cast<int>(Any(3) == 0 ? Any(12) : 0);
+      cursor.movePosition(QTextCursor::Down, QTextCursor::KeepAnchor, lines);
+      cursor.movePosition(QTextCursor::EndOfBlock, QTextCursor::KeepAnchor);
+      const QString chosen = cursor.selectedText().replace(QChar::ParagraphSeparator, '\n');
+      switch (Any(4)) {
+        case 0:
+          cursor.insertText("");
+          break;
+        case 1:
+          cursor.insertText(chosen + "\n" + chosen);
+          break;
+        default: {
+          const qsizetype equals = chosen.indexOf('=');
+          if (equals > 0) cursor.insertText(chosen.left(equals + 2) + Typed());
+        }
+      }
+      QTest::keyClick(&text, Any(2) == 0 ? Qt::Key_Up : Qt::Key_Down);
+      QApplication::processEvents();
+    }
+    view.Commit();
+    if (view.HasTyping()) view.Drop();
+    EXPECT_EQ(FirstDifference(FromQt(text.toPlainText()), test::SavedText(Document())), "") << "the text that is shown";
+    setup_.Frame().ShowText(false);
+  }
+
+  void Note() {
+    auto& view = *setup_.Frame().findChild<NotesView*>();
+    const std::vector<ReviewNote> notes = view.Notes();
+    if (notes.empty() || Any(2) == 0) {
+      CYbSEKvfBase* node = FindNode(Document().Root(), ParseSetupPath(setup_.Frame().CurrentPath()).steps);
+      return node ? view.Add(*node, "", "Anna", FromQt(Typed()) + "?") : void();
+    }
+    const std::string& name = notes[Any(notes.size())].name;
+    Any(2) == 0 ? view.Answer(name, "Bo", "yes") : view.Remove(name);
   }
 
   void ActOnPage() {
@@ -217,6 +272,66 @@ TEST(Monkey, WhateverIsPressedAndTypedIsUndoneAndKept) {
     monkey.Work(steps);
     monkey.Conclude();
   }
+}
+
+// ---- Much at once, and the same for very long
+
+TEST(Program, AHundredSetupsAreOpenAndEachIsItself) {
+  OpenedSetup setup;
+  for (int number = 1; number < 100; ++number) {
+    const std::string title = std::to_string(number);
+    const std::string path = setup.Folder().Write(
+        "setup" + title + ".tvd",
+        test::SetupText(14, "section SimSpec {\nsection SimTitle {\nTitle = \"" + title + "\"\n}\n}"));
+    ASSERT_TRUE(setup.Window().OpenDocument(ToQt(path)));
+  }
+  auto* tabs = setup.Window().findChild<QTabWidget*>();
+  ASSERT_EQ(tabs->count(), 100);
+  for (int number = 99; number > 0; number -= 7) {
+    tabs->setCurrentIndex(number);
+    EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), std::to_string(number));
+    setup.GoTo("SimSpec/SimTitle:Title");
+    setup.Type("changed");
+    setup.Command("Save");
+    EXPECT_EQ(setup.Value("SimSpec/SimTitle:Title"), "changed");
+  }
+  while (tabs->count() > 1) setup.Command("Close");
+  EXPECT_EQ(setup.Path(), setup.Session().Path());
+}
+
+/// Bytes that the allocator has handed out, when all that waits to be deleted is.
+std::size_t Taken() {
+  for (int i = 0; i < 3; ++i) {
+    QApplication::processEvents();
+    QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+  }
+  return mallinfo2().uordblks;
+}
+
+TEST(Program, TakesNoMoreMemoryTheLongerItGoesOn) {
+  OpenedSetup setup;
+  int number = 0;
+  const auto work = [&] {
+    for (const char* page : {"Climate/PrecipitationRate", "SimSpec", "SaturatedZone", "Catchment", "StoringOfResults"})
+      setup.GoTo(page);
+    setup.GoTo("SimSpec/SimTitle:Title");
+    setup.Type(QString::number(++number));
+    setup.Press(Qt::Key_Return);
+    setup.Command("Text of the Setup");
+    setup.Command("Text of the Setup");
+    setup.Frame().Undo();
+    setup.Frame().Redo();
+    setup.Frame().Undo();
+    if (number % 5 == 0) setup.Command("Save");
+  };
+  // Caches fill, and the list of visited pages.
+  for (int i = 0; i < 40; ++i) work();
+  const std::size_t before = Taken();
+  constexpr int kRounds = 40;
+  for (int i = 0; i < kRounds; ++i) work();
+  const std::size_t after = Taken();
+  // A page, a text or an open file that stays behind takes hundreds of thousands.
+  EXPECT_LT(after, before + kRounds * 30'000);
 }
 
 }  // namespace
