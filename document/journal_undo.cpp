@@ -81,7 +81,8 @@ std::string EditsOf(const CFlowModelDoc& document, const JournalStep& step, std:
   std::map<std::string, std::vector<const JournalChange*>> bySection;
   for (const JournalChange& change : step.changes) {
     if (change.kind != SetupDifference::Kind::Changed || change.key.empty())
-      return fmt::format("{} was {}: only values can be taken back on their own", change.path, NameOf(change.kind));
+      return fmt::format("{} was {}: only values can be taken back on their own",
+                         change.key.empty() ? change.path : PlaceOf(change), NameOf(change.kind));
     bySection[change.path].push_back(&change);
   }
   const OpenKvf now(document.BuildFile(document.Root().SetupFolder()));

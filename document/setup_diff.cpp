@@ -4,6 +4,8 @@
 
 #include <algorithm>
 #include <array>
+#include <bit>
+#include <cstdint>
 #include <unordered_map>
 
 #include "core/kvf_writer.h"
@@ -36,6 +38,39 @@ std::vector<NumberedNode> ChildrenOf(const KvfSection& section, bool keywords) {
   return children;
 }
 
+bool AreAlike(const KvfParam& a, const KvfParam& b) {
+  if (a.type != b.type) return false;
+  if (a.IsText()) return a.Text() == b.Text();
+  switch (a.type) {
+    case KvfType::Double:
+      return std::bit_cast<std::uint64_t>(a.asDouble) == std::bit_cast<std::uint64_t>(b.asDouble);
+    case KvfType::Float:
+      return std::bit_cast<std::uint32_t>(a.asFloat) == std::bit_cast<std::uint32_t>(b.asFloat);
+    case KvfType::Bool:
+      return a.asBool == b.asBool;
+    default:
+      return a.asInt == b.asInt;
+  }
+}
+
+/// Whether both hold the same in the same order: nearly all of two files is so, and needs no text to be compared.
+bool AreAlike(const KvfSection& a, const KvfSection& b) {
+  if (a.count != b.count) return false;
+  const KvfNode* other = b.firstChild;
+  for (const KvfNode* node = a.firstChild; node; node = node->next, other = other->next) {
+    if (node->IsKeyword() != other->IsKeyword() || node->count != other->count ||
+        node->WrittenName() != other->WrittenName())
+      return false;
+    if (!node->IsKeyword()) {
+      if (!AreAlike(*AsSection(node), *AsSection(other))) return false;
+      continue;
+    }
+    for (std::uint32_t i = 0; i < node->count; ++i)
+      if (!AreAlike(node->params[i], other->params[i])) return false;
+  }
+  return true;
+}
+
 /// Places in a longest increasing run of `values`: what moved least.
 std::vector<bool> LongestIncreasing(const std::vector<std::size_t>& values) {
   std::vector<std::size_t> ends;  // place of the smallest end of a run of each length
@@ -61,6 +96,7 @@ class Comparison {
   std::vector<SetupDifference> result;
 
   void CompareSections(KvfSection& from, KvfSection& to, const std::string& path) {
+    if (AreAlike(from, to)) return;
     CompareKeys(from, to, path);
     const std::vector<NumberedNode> olds = ChildrenOf(from, false);
     const std::vector<NumberedNode> news = ChildrenOf(to, false);
@@ -147,6 +183,17 @@ class Comparison {
                                              const std::vector<NumberedNode>& news) {
     std::vector<std::size_t> partner(news.size(), kNone);
     std::vector<bool> isTaken(olds.size(), false);
+    // What stands alike at both ends has not moved.
+    const auto match = [&](std::size_t old, std::size_t item) {
+      if (!AreAlike(*AsSection(olds[old].node), *AsSection(news[item].node))) return false;
+      partner[item] = old;
+      isTaken[old] = true;
+      return true;
+    };
+    const std::size_t most = std::min(olds.size(), news.size());
+    std::size_t front = 0, back = 0;
+    while (front < most && match(front, front)) ++front;
+    while (front + back < most && match(olds.size() - 1 - back, news.size() - 1 - back)) ++back;
     for (const Trait trait : {Trait::Content, Trait::Name, Trait::Section}) {
       std::unordered_map<std::string, std::vector<std::size_t>> places;
       for (std::size_t i = olds.size(); i-- > 0;)
