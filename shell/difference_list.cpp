@@ -37,6 +37,7 @@ QString KindText(SetupDifference::Kind kind) {
 
 DifferenceList::DifferenceList(const QString& from, const QString& to) {
   const Theme& theme = Theme::Get();
+  setAccessibleName(tr("Differences"));
   setRootIsDecorated(true);
   setAlternatingRowColors(true);
   setUniformRowHeights(true);

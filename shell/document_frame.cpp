@@ -109,6 +109,7 @@ void DocumentFrame::BuildBody() {
   treeTabs_->setUsesScrollButtons(false);
   const auto tree = [&](int id, const QString& title, const QString& emptyText) {
     auto* made = new NodeTree(id, emptyText);
+    made->setAccessibleName(title);
     treeTabs_->addTab(made, title);
     trees_.push_back(made);
     connect(made, &NodeTree::NodeChosen, this, [this](quint64 serial) { GoTo(serial); });
@@ -150,14 +151,17 @@ void DocumentFrame::BuildBody() {
     node->SetRevalidateAll();
     session_->UpdateDoc(*node, kTreeRebuilt | kDataChanged, mend.text);
   });
+  findings_->setAccessibleName(tr("Findings"));
   bottomTabs_->addTab(findings_, tr("Findings"));
   BuildNotes();
   BuildJournal();
   log_ =
       new LogView(run_->Log(), tr("What happens to this document, and what an engine that runs it says, stands here."));
   log_->SetFile([this] { return run_->LogFile(); });
+  log_->setAccessibleName(tr("Execution Log"));
   bottomTabs_->addTab(log_, tr("Execution Log"));
   riverLog_ = new LogView(run_->RiverLog(), tr("What the river engine says during a run stands here."));
+  riverLog_->setAccessibleName(tr("Fluvane Execution Log"));
   bottomTabs_->addTab(riverLog_, tr("Fluvane Execution Log"));
   auto* bottom = new QWidget;
   auto* below = new QVBoxLayout(bottom);

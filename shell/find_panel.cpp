@@ -53,6 +53,7 @@ FindPanel::FindPanel(CYbSEDocument& document, QWidget* trees) : document_(docume
   column->addWidget(count_);
   list_ = new QTreeWidget;
   list_->setHeaderHidden(true);
+  list_->setAccessibleName(tr("Places found"));
   list_->setRootIsDecorated(false);
   list_->setFrameShape(QFrame::NoFrame);
   list_->setAlternatingRowColors(true);

@@ -42,6 +42,7 @@
 #include "shell/run_comparison_view.h"
 #include "shell/template_tab.h"
 #include "shell/welcome_page.h"
+#include "shell/widgets/drawing_access.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -131,7 +132,10 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   connect(
       frame, &DocumentFrame::ReloadWanted, this, [this, frame] { ReloadDocument(frame); }, Qt::QueuedConnection);
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
-  connect(frame, &DocumentFrame::Told, this, [this](const QString& text) { statusBar()->showMessage(text, kToldFor); });
+  connect(frame, &DocumentFrame::Told, this, [this](const QString& text) {
+    statusBar()->showMessage(text, kToldFor);
+    Announce(*statusBar(), text);
+  });
   tabs_->setCurrentIndex(tabs_->addTab(frame, frame->Title()));
   frame->FocusNextPane();
   SyncCommands();

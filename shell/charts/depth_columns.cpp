@@ -11,6 +11,7 @@
 #include "platform/item_types.h"
 #include "platform/text.h"
 #include "shell/charts/chart_style.h"
+#include "shell/widgets/drawing_access.h"
 #include "shell/widgets/layer_colors.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/shown_unit.h"
@@ -38,6 +39,7 @@ double RoundDepthStep(double step) {
 DepthColumns::DepthColumns(QWidget* parent) : QWidget(parent) {
   setMinimumSize(Theme::Get().Scaled(200), Theme::Get().Scaled(140));
   setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
+  DescribeDrawing(*this, {});
 }
 
 void DepthColumns::Show(DepthContent content, const DisplayUnits* units) {

@@ -45,6 +45,7 @@ SectionView::SectionView(Host& host, QWidget* parent)
   message_->setAlignment(Qt::AlignCenter);
   message_->setWordWrap(true);
   message_->setMargin(Theme::Get().Scaled(16));
+  chart_->setAccessibleName(tr("Section"));
   message_->setAutoFillBackground(true);
   message_->setBackgroundRole(QPalette::Base);
   Hold({chart_, [this](double factor) { Zoom(factor); }, [this] { Fit(); },

@@ -61,6 +61,7 @@ SeriesPlot::SeriesPlot(Host& host, QWidget* parent)
   chart_->setMinimumSize(Theme::Get().Scaled(200), Theme::Get().Scaled(140));
   chart_->setFocusPolicy(Qt::StrongFocus);
   chart_->installEventFilter(this);
+  chart_->setAccessibleName(tr("Chart of values over time"));
   chart_->setInteractions(QCP::iRangeDrag | QCP::iRangeZoom);
   chart_->setSelectionRectMode(QCP::srmNone);
   // Many values: lines of one pixel are drawn without the slow joins.

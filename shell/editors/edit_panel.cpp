@@ -37,6 +37,8 @@ EditPanel::EditPanel() {
   groups->setWidget(body);
   groups->setWidgetResizable(true);
   groups->setFrameShape(QFrame::NoFrame);
+  // The keyboard goes to what it holds.
+  groups->setFocusPolicy(Qt::NoFocus);
   groups->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);

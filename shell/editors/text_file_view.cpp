@@ -27,6 +27,7 @@ TextFileView::TextFileView(QWidget* parent) : QWidget(parent), text_(new QPlainT
   column->addWidget(status_);
   text_->setReadOnly(true);
   text_->setUndoRedoEnabled(false);
+  text_->setAccessibleName(tr("Text of the file"));
   text_->setLineWrapMode(QPlainTextEdit::NoWrap);
   QFont font(QStringList{"Courier New", "DejaVu Sans Mono"});
   font.setStyleHint(QFont::Monospace);

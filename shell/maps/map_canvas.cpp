@@ -46,6 +46,7 @@ MapCanvas::MapCanvas(QWidget* parent)
   setMinimumSize(Theme::Get().Scaled(160), Theme::Get().Scaled(120));
   setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
   setCursor(Qt::CrossCursor);
+  setAccessibleName(tr("Map"));
   connect(&Theme::Get(), &Theme::Changed, this, [this] { Arrange(); });
 }
 

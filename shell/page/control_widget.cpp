@@ -143,9 +143,16 @@ QBoxLayout* ControlWidget::MakeField(QWidget* editor, bool grows) {
   column->addWidget(message_);
   if (auto* label = qobject_cast<QLabel*>(label_)) label->setBuddy(FocusTarget() ? FocusTarget() : editor);
   if (!control_.toolTip.empty()) editor->setToolTip(Translated(control_.toolTip));
-  if (QWidget* target = editor; target->accessibleName().isEmpty() && !control_.label.empty())
-    target->setAccessibleName(Translated(control_.label));
+  NameFor(*editor);
+  if (FocusTarget()) NameFor(*FocusTarget());
   return row;
+}
+
+void ControlWidget::NameFor(QWidget& target) const {
+  if (!target.accessibleName().isEmpty() || qobject_cast<QAbstractButton*>(&target)) return;
+  // What fills a page has no label but the page's.
+  const std::string& label = control_.label.empty() ? page_.Node().GetTitle() : control_.label;
+  target.setAccessibleName(Translated(label));
 }
 
 QWidget* ControlWidget::MakeUnit() {
@@ -236,6 +243,17 @@ void ControlWidget::SyncMessage() {
   message_->setPalette(palette);
   message_->setText(text);
   message_->setVisible(!text.isEmpty());
+  SyncDescription();
+}
+
+void ControlWidget::SyncDescription() {
+  QWidget* target = FocusTarget() ? FocusTarget() : editor_.data();
+  if (!target) return;
+  QStringList parts{message_ ? message_->text() : QString(), findings_, Translated(control_.UnitText()),
+                    target->toolTip()};
+  parts.removeAll(QString());
+  const QString text = parts.join('\n');
+  if (target->accessibleDescription() != text) target->setAccessibleDescription(text);
 }
 
 void ControlWidget::SyncFindings() {
@@ -251,6 +269,8 @@ void ControlWidget::SyncFindings() {
     }
   }
   mark_->setVisible(!texts.isEmpty() && control_.IsShown());
+  findings_ = texts;
+  SyncDescription();
   if (texts.isEmpty()) return;
   mark_->setToolTip(texts);
   mark_->setAccessibleName(texts);

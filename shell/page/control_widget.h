@@ -88,11 +88,14 @@ class ControlWidget : public QObject {
 
  private:
   QWidget* MakeUnit();
+  void NameFor(QWidget& target) const;
   void SyncSubject();
   void ForgetRefusal();
   void SyncUnit();
   void SyncFindings();
   void SyncMessage();
+  /// Tells screen readers what stands beside and below the field.
+  void SyncDescription();
 
   CYbSEDlgBase& page_;
   Control& control_;
@@ -103,7 +106,7 @@ class ControlWidget : public QObject {
   QPointer<QWidget> editor_;
   QPointer<QWidget> dot_;  ///< Marks a value that is not the default.
   std::optional<std::string> reset_;
-  QString refusal_, remark_;
+  QString refusal_, remark_, findings_;
   std::uintptr_t subject_ = 0;  ///< What the value that is shown belongs to.
 };
 

@@ -76,6 +76,7 @@ QVariant TableModel::data(const QModelIndex& index, int role) const {
       // What does not fit into its cell is read here.
       return Table().IsShownOnly() ? ToQt(Table().ShownCell(row, column)) : Translated(Table().ToolTip(row, column));
     case Qt::AccessibleTextRole:
+      if (Table().Kind(row, column) == CellKind::Check) return Translated(Table().Head(column));
       // A button may have no more than an icon.
       return Table().Column(column) && Table().Column(column)->IsButton() && Table().ShownCell(row, column).empty()
                  ? QVariant(Translated(Table().ToolTip(row, column)))

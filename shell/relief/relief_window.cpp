@@ -77,6 +77,7 @@ QWidget* ReliefWindow::BuildPanel() {
     column->addWidget(buddy);
   };
   bodies_ = new QListWidget;
+  bodies_->setAccessibleName(tr("Bodies"));
   bodies_->setToolTip(tr("What is shown"));
   head(tr("&Shown:"), bodies_);
   connect(bodies_, &QListWidget::itemChanged, this, &ReliefWindow::TakeBody);

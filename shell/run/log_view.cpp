@@ -15,6 +15,7 @@
 #include <algorithm>
 
 #include "execution/engine_line.h"
+#include "shell/widgets/drawing_access.h"
 #include "shell/widgets/theme.h"
 
 namespace tervane {
@@ -36,6 +37,16 @@ LogView::LogView(const LogTail& lines, const QString& emptyText) : lines_(lines)
   setFrameShape(QFrame::NoFrame);
   setFocusPolicy(Qt::StrongFocus);
   setFont(LogFont());
+  DescribeDrawing(
+      *this,
+      [this] {
+        QStringList shown;
+        const auto first = static_cast<std::size_t>(verticalScrollBar()->value());
+        for (std::size_t line = first; line < lines_.Count() && shown.size() < LinesInSight(); ++line)
+          shown << TextOf(line);
+        return shown.isEmpty() ? emptyText_ : shown.join('\n');
+      },
+      QAccessible::Document);
   viewport()->setBackgroundRole(QPalette::Base);
   viewport()->setCursor(Qt::IBeamCursor);
   setVerticalScrollBarPolicy(Qt::ScrollBarAlwaysOn);

@@ -52,6 +52,7 @@ Banner::Banner(const QString& text, const std::vector<Answer>& answers, Tone ton
   close->setIcon(theme.Icon("close"));
   close->setAutoRaise(true);
   close->setToolTip(tr("Close this message"));
+  close->setAccessibleName(close->toolTip());
   row->addWidget(close);
   connect(close, &QToolButton::clicked, this, [this] {
     hide();

@@ -12,6 +12,7 @@
 #include <utility>
 
 #include "platform/files.h"
+#include "shell/widgets/drawing_access.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 #include "shell/widgets/wait_panel.h"
@@ -44,6 +45,7 @@ PlotFrame::PlotFrame(Host& host, QWidget* parent) : QWidget(parent), host_(host)
 
 void PlotFrame::Hold(Plot plot) {
   plot_ = std::move(plot);
+  DescribeDrawing(*plot_.widget, [this] { return Status(); });
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(2);
@@ -130,7 +132,11 @@ QAction* PlotFrame::AddCommand(const QString& text, std::function<void()> comman
   return action;
 }
 
-void PlotFrame::SetStatus(const QString& text) { status_->setText(text); }
+void PlotFrame::SetStatus(const QString& text) {
+  if (text == status_->text()) return;
+  status_->setText(text);
+  TellDrawing(*plot_.widget);
+}
 
 QString PlotFrame::Status() const { return status_->text(); }
 

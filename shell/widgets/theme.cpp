@@ -32,6 +32,7 @@ QPalette LightPalette() {
   palette.setColor(QPalette::Highlight, QColor(0x1b, 0x6f, 0xa8));
   palette.setColor(QPalette::HighlightedText, Qt::white);
   palette.setColor(QPalette::Link, QColor(0x1b, 0x6f, 0xa8));
+  palette.setColor(QPalette::LinkVisited, QColor(0x6b, 0x4f, 0xa0));
   palette.setColor(QPalette::PlaceholderText, QColor(0x6b, 0x72, 0x80));
   for (const auto role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText})
     palette.setColor(QPalette::Disabled, role, QColor(0x8a, 0x91, 0x9c));
@@ -41,16 +42,17 @@ QPalette LightPalette() {
 
 QPalette DarkPalette() {
   QPalette palette(QColor(0x33, 0x38, 0x40));
-  palette.setColor(QPalette::Window, QColor(0x31, 0x36, 0x3e));
+  palette.setColor(QPalette::Window, QColor(0x28, 0x2d, 0x34));
   palette.setColor(QPalette::Base, QColor(0x1c, 0x1f, 0x24));
   palette.setColor(QPalette::AlternateBase, QColor(0x22, 0x26, 0x2b));
   palette.setColor(QPalette::Button, QColor(0x3d, 0x43, 0x4c));
   for (const auto role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText, QPalette::ToolTipText})
     palette.setColor(role, QColor(0xe6, 0xe8, 0xeb));
   palette.setColor(QPalette::ToolTipBase, QColor(0x33, 0x38, 0x40));
-  palette.setColor(QPalette::Highlight, QColor(0x2f, 0x86, 0xc1));
+  palette.setColor(QPalette::Highlight, QColor(0x2b, 0x7b, 0xb5));
   palette.setColor(QPalette::HighlightedText, Qt::white);
   palette.setColor(QPalette::Link, QColor(0x6c, 0xb6, 0xe8));
+  palette.setColor(QPalette::LinkVisited, QColor(0xc4, 0xb0, 0xf5));
   palette.setColor(QPalette::PlaceholderText, QColor(0x93, 0x9a, 0xa5));
   for (const auto role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText})
     palette.setColor(QPalette::Disabled, role, QColor(0x8f, 0x96, 0xa1));
@@ -147,9 +149,9 @@ QIcon Theme::Icon(const QString& name) const {
   return icon;
 }
 
-QColor Theme::ErrorColor() const { return isDark_ ? QColor(0xff, 0x7b, 0x72) : QColor(0xc4, 0x26, 0x1d); }
-QColor Theme::WarningColor() const { return isDark_ ? QColor(0xe3, 0xb3, 0x41) : QColor(0x9a, 0x67, 0x00); }
+QColor Theme::ErrorColor() const { return isDark_ ? QColor(0xff, 0x90, 0x88) : QColor(0xc4, 0x26, 0x1d); }
+QColor Theme::WarningColor() const { return isDark_ ? QColor(0xe3, 0xb3, 0x41) : QColor(0x8f, 0x5f, 0x00); }
 QColor Theme::NoteColor() const { return isDark_ ? QColor(0x6c, 0xb6, 0xe8) : QColor(0x1b, 0x6f, 0xa8); }
-QColor Theme::QuietColor() const { return isDark_ ? QColor(0x9a, 0xa1, 0xac) : QColor(0x5f, 0x67, 0x73); }
+QColor Theme::QuietColor() const { return isDark_ ? QColor(0xa9, 0xb0, 0xba) : QColor(0x5f, 0x67, 0x73); }
 
 }  // namespace tervane

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/editors/grid_editor.h"
 
+#include <QComboBox>
 #include <QPushButton>
 #include <QTabWidget>
 

@@ -13,10 +13,10 @@
 
 #include <gmock/gmock.h>
 
-#include "pages/tree_entries.h"
 #include "shell/maps/map_canvas.h"
 #include "shell/widgets/theme.h"
 #include "tests/shell/opened_setup.h"
+#include "tests/shell/rich_setups.h"
 #include "tests/support/preprocessed_run.h"
 
 namespace tervane::page_view_test {
@@ -185,17 +185,6 @@ std::string Faults(PageView& page) {
   return faults;
 }
 
-/// Setups in which every page shows all that it has.
-constexpr const char* kSetups[] = {
-    "section SimSpec {\nsection ModelComp {\nWQ = 1\nRiver = 1\nUseCurrentWmSimulation = 0\n}\n"
-    "section SimulationPeriod {\nHotStart = 1\n}\n}\n"
-    "section ModelCompWQ {\nOL = 1\nUZ = 1\nSZ = 1\nIncludeProcesses = 1\n}\n"
-    "section LandUse {\nsection Vegetation {\nsection GLOBAL {\nTYPE = 3\n}\n}\n}",
-    "section SimSpec {\nsection ModelComp {\nWQ = 1\nADPTRadio = 1\n}\n}\n"
-    "section LandUse {\nsection Vegetation {\nDistributionType = 2\nsection STATION_BASED {\nNO_TIMESERIES = 2\n}\n"
-    "section TIME_SERIES_1 {\nTYPE = 2\n}\nsection TIME_SERIES_2 {\nTYPE = 3\n}\n}\n}",
-    "section SimSpec {\nModelType = 1\nsection ModModelComp {\nSubsurface_ModelType = 2\nWithAirFlow = 1\n}\n}"};
-
 TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
   const struct {
     double zoom;
@@ -203,19 +192,20 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
   } cases[] = {{1, {1280, 800}}, {1.5, {1280, 800}}, {1, {900, 600}}};
   for (const auto& [zoom, window] : cases) {
     Theme::Get().SetZoom(zoom);
-    for (const char* sections : kSetups) {
+    for (const char* sections : test::kRichSetups) {
       OpenedSetup setup(sections, window);
       test::WritePreprocessedRun(setup.Folder().File("karup_results"), "karup");
       setup.Frame().RebuildProcessedData();
-      int pages = 0;
+      int count = 0;
       std::vector<std::string> paths;
       const auto add = [&](int tree) {
-        for (const TreeEntry& entry : TreeEntries(setup.Session().Document().Root(), tree)) paths.push_back(entry.path);
+        const std::vector<std::string> pages = test::PagesOf(setup, tree);
+        paths.insert(paths.end(), pages.begin(), pages.end());
       };
       add(kSetupDataTree);
       // What the preprocessor left is the same of all setups.
-      if (sections == kSetups[0]) add(kProcessedDataTree);
-      if (sections == kSetups[0]) add(kResultsTree);
+      if (sections == test::kRichSetups[0]) add(kProcessedDataTree);
+      if (sections == test::kRichSetups[0]) add(kResultsTree);
       paths.emplace_back("CCoverageKvf");
       for (const std::string& path : paths) {
         SCOPED_TRACE(path + " at " + std::to_string(zoom));
@@ -224,9 +214,9 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
         // Layouts within layouts settle one after the other.
         for (int i = 0; i < 3; ++i) QApplication::processEvents();
         EXPECT_EQ(Faults(ShownPage(setup)), "");
-        ++pages;
+        ++count;
       }
-      EXPECT_GT(pages, 5);
+      EXPECT_GT(count, 5);
     }
   }
   Theme::Get().SetZoom(1);
