@@ -1,0 +1,150 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "platform/translations.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace tervane {
+
+namespace {
+
+bool IsPlaceholder(std::string_view text, std::size_t at) {
+  return text[at] == '%' && at + 1 < text.size() && text[at + 1] >= '1' && text[at + 1] <= '9';
+}
+
+std::vector<char> PlaceholdersOf(std::string_view text) {
+  std::vector<char> found;
+  for (std::size_t i = 0; i < text.size(); ++i)
+    if (IsPlaceholder(text, i)) found.push_back(text[++i]);
+  return found;
+}
+
+/// The text between the quotes; nothing when they or an escape are wrong.
+std::optional<std::string> Unquoted(std::string_view text) {
+  if (text.size() < 2 || text.front() != '"' || text.back() != '"') return {};
+  text = text.substr(1, text.size() - 2);
+  std::string plain;
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    if (text[i] == '"') return {};
+    if (text[i] != '\\') {
+      plain += text[i];
+      continue;
+    }
+    if (++i == text.size()) return {};
+    constexpr std::string_view kEscapes = "nt\"\\", kMeant = "\n\t\"\\";
+    const std::size_t escape = kEscapes.find(text[i]);
+    if (escape == std::string_view::npos) return {};
+    plain += kMeant[escape];
+  }
+  return plain;
+}
+
+/// The values of a finished text; nothing when it is not of this form.
+std::optional<std::vector<std::string_view>> ValuesIn(std::string_view text, const std::vector<std::string>& literals) {
+  if (!text.starts_with(literals.front())) return {};
+  text.remove_prefix(literals.front().size());
+  if (!text.ends_with(literals.back())) return {};
+  text.remove_suffix(literals.back().size());
+  std::vector<std::string_view> values;
+  for (std::size_t i = 1; i + 1 < literals.size(); ++i) {
+    const std::size_t at = text.find(literals[i]);
+    if (at == std::string_view::npos) return {};
+    values.push_back(text.substr(0, at));
+    text.remove_prefix(at + literals[i].size());
+  }
+  values.push_back(text);
+  return values;
+}
+
+}  // namespace
+
+Translations::Translations(std::string_view catalogue) {
+  std::string context, english, translated;
+  std::string* current = nullptr;
+  int line = 0, begin = 0;
+  const auto take = [&] {
+    if (!english.empty() && !translated.empty()) Take(context, english, translated, begin);
+    for (std::string* part : {&context, &english, &translated}) part->clear();
+    current = nullptr;
+  };
+  while (!catalogue.empty() && problem_.empty()) {
+    ++line;
+    const std::size_t end = std::min(catalogue.find('\n'), catalogue.size());
+    std::string_view text = catalogue.substr(0, end);
+    catalogue.remove_prefix(std::min(end + 1, catalogue.size()));
+    if (text.ends_with('\r')) text.remove_suffix(1);
+    if (text.starts_with('#')) continue;
+    const bool isContext = text.starts_with("msgctxt "), isEnglish = text.starts_with("msgid ");
+    if (text.empty() || isContext || (isEnglish && current != &context)) take();
+    if (text.empty()) continue;
+    if (isContext || isEnglish) {
+      current = isContext ? &context : &english;
+      begin = line;
+    } else if (text.starts_with("msgstr ")) {
+      current = &translated;
+    }
+    if (!text.starts_with('"')) text.remove_prefix(std::min(text.find(' ') + 1, text.size()));
+    const std::optional<std::string> plain = Unquoted(text);
+    if (!current || !plain)
+      Refuse(line, "msgctxt, msgid, msgstr or a text in quotes was expected");
+    else
+      *current += *plain;
+  }
+  if (problem_.empty()) take();
+  std::ranges::stable_sort(templates_, [](const Template& a, const Template& b) { return a.letters > b.letters; });
+}
+
+void Translations::Take(const std::string& context, const std::string& english, const std::string& translated,
+                        int line) {
+  std::vector<char> wanted = PlaceholdersOf(english), given = PlaceholdersOf(translated);
+  const bool isTemplate = context == "Pages" && !wanted.empty();
+  if (isTemplate)
+    for (std::size_t i = 0; i < wanted.size(); ++i)
+      if (wanted[i] != static_cast<char>('1' + i)) return Refuse(line, "%1, %2 ... in this order were expected");
+  std::ranges::sort(wanted);
+  std::ranges::sort(given);
+  if (wanted != given) return Refuse(line, "the translation has other place holders than the text");
+  if (!exact_.emplace(english, translated).second) return Refuse(line, "this text has an entry already");
+  texts_.push_back(english);
+  if (!isTemplate) return;
+  Template made{{""}, translated};
+  for (std::size_t i = 0; i < english.size(); ++i) {
+    if (IsPlaceholder(english, i)) {
+      ++i;
+      made.literals.emplace_back();
+    } else {
+      made.literals.back() += english[i];
+      ++made.letters;
+    }
+  }
+  templates_.push_back(std::move(made));
+}
+
+void Translations::Refuse(int line, const std::string& why) {
+  if (problem_.empty()) problem_ = "line " + std::to_string(line) + ": " + why;
+}
+
+std::optional<std::string> Translations::Exact(std::string_view english) const {
+  const auto found = exact_.find(std::string(english));
+  return found == exact_.end() ? std::nullopt : std::optional(found->second);
+}
+
+std::optional<std::string> Translations::Finished(std::string_view english) const {
+  if (auto found = Exact(english)) return found;
+  for (const Template& candidate : templates_) {
+    const auto values = ValuesIn(english, candidate.literals);
+    if (!values) continue;
+    std::string text;
+    for (std::size_t i = 0; i < candidate.translated.size(); ++i) {
+      if (IsPlaceholder(candidate.translated, i))
+        text += (*values)[static_cast<std::size_t>(candidate.translated[++i] - '1')];
+      else
+        text += candidate.translated[i];
+    }
+    return text;
+  }
+  return {};
+}
+
+}  // namespace tervane

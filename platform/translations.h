@@ -1,0 +1,47 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+namespace tervane {
+
+/// English texts in another language, from a catalogue in the PO format of gettext: comments, msgctxt, msgid, msgstr.
+/// Texts of pages and findings come finished, values in them; an entry of the context "Pages" that has %1, %2 ... (each
+/// once and in this order in the English) is a template for these: the values go over to the other text.
+class Translations {
+ public:
+  Translations() = default;
+  /// Takes the catalogue up to its first fault, of which Problem tells.
+  explicit Translations(std::string_view catalogue);
+
+  /// Empty, or the fault of the catalogue with its line.
+  const std::string& Problem() const { return problem_; }
+  /// The entry of a text as it stands in the sources; nothing when there is none.
+  std::optional<std::string> Exact(std::string_view english) const;
+  /// The same of a finished text of a page or finding: its own entry, or that of the template with the most letters.
+  std::optional<std::string> Finished(std::string_view english) const;
+  /// The texts that have an entry, in the order of the catalogue.
+  const std::vector<std::string>& Texts() const { return texts_; }
+
+ private:
+  struct Template {
+    std::vector<std::string> literals;  ///< What stands before, between and behind the values.
+    std::string translated;
+    std::size_t letters = 0;
+  };
+
+  void Take(const std::string& context, const std::string& english, const std::string& translated, int line);
+  void Refuse(int line, const std::string& why);
+
+  std::unordered_map<std::string, std::string> exact_;
+  std::vector<Template> templates_;  ///< Those with the most letters first.
+  std::vector<std::string> texts_;
+  std::string problem_;
+};
+
+}  // namespace tervane

@@ -1,0 +1,46 @@
+// Copyright (C) 2026 the Tervane developers
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "platform/translations.h"
+
+#include <gtest/gtest.h>
+
+namespace tervane {
+namespace {
+
+constexpr const char* kSample =
+    "# of a test\n"
+    "msgid \"\"\nmsgstr \"Content-Type: text/plain; charset=UTF-8\\n\"\n\n"
+    "msgid \"Save %1\"\nmsgstr \"%1 speichern\"\n\n"
+    "msgid \"Not yet\"\nmsgstr \"\"\n\n"
+    "msgctxt \"Pages\"\nmsgid \"%1 of %2\"\nmsgstr \"%2: %1\"\n\n"
+    "msgctxt \"Pages\"\nmsgid \"%1 of %2 \"\n\"\\\"wells\\\"\"\nmsgstr \"%1 von %2 \\\"Brunnen\\\"\"\n";
+
+TEST(TranslationsTest, ValuesGoOverToTheTemplateWithTheMostLetters) {
+  const Translations texts(kSample);
+  EXPECT_EQ(texts.Problem(), "");
+  EXPECT_EQ(texts.Finished("3 of 12 \"wells\""), "3 von 12 \"Brunnen\"");
+  EXPECT_EQ(texts.Finished("3 of 12"), "12: 3");
+  EXPECT_EQ(texts.Finished("of"), std::nullopt);
+  // A template of the window alone is no form of a finished text.
+  EXPECT_EQ(texts.Exact("Save %1"), "%1 speichern");
+  EXPECT_EQ(texts.Finished("Save all"), std::nullopt);
+  // What has no translation yet stays English.
+  EXPECT_EQ(texts.Exact("Not yet"), std::nullopt);
+}
+
+TEST(TranslationsTest, FaultsAreToldWithTheirLine) {
+  const struct {
+    const char* catalogue;
+    const char* problem;
+  } cases[] = {
+      {"msgid \"a\"\nmsgstr \"b\n", "line 2: msgctxt, msgid, msgstr or a text in quotes was expected"},
+      {"\n\"alone\"\n", "line 2: msgctxt, msgid, msgstr or a text in quotes was expected"},
+      {"msgid \"a %1\"\nmsgstr \"b\"\n", "line 1: the translation has other place holders than the text"},
+      {"msgctxt \"Pages\"\nmsgid \"%2 %1\"\nmsgstr \"%1 %2\"\n", "line 2: %1, %2 ... in this order were expected"},
+      {"msgid \"a\"\nmsgstr \"b\"\n\nmsgid \"a\"\nmsgstr \"c\"\n", "line 4: this text has an entry already"},
+  };
+  for (const auto& [catalogue, problem] : cases) EXPECT_EQ(Translations(catalogue).Problem(), problem) << catalogue;
+}
+
+}  // namespace
+}  // namespace tervane
