@@ -31,6 +31,16 @@ QString FindingText(const SetupFinding& finding) {
   return finding.detail.empty() ? text : text + " — " + ToQt(finding.detail);
 }
 
+/// A place in the user's language: titles, then the name of a control, whose label may end in a colon.
+QString TranslatedPlace(const QString& place) {
+  QStringList steps = place.split(" > ");
+  for (QString& step : steps) {
+    const QString title = Translated(FromQt(step)), label = Translated(FromQt(step + ":"));
+    step = title != step ? title : label.chopped(1);
+  }
+  return steps.join(" > ");
+}
+
 void CollectNodes(CYbSEKvfBase& node, std::unordered_map<std::uint64_t, CYbSEKvfBase*>& wanted) {
   if (const auto found = wanted.find(node.Serial()); found != wanted.end()) found->second = &node;
   for (CYbSEKvfBase* child = node.GetFirstChild(); child; child = node.GetNextChild(child))
@@ -91,7 +101,7 @@ QTreeWidgetItem* FindingsView::NewLine(const SetupFinding& finding, const QStrin
   const bool isWarning = finding.kind == SetupFinding::Kind::Warning;
   item->setIcon(kKindColumn, Theme::Get().Icon(isError ? "error" : isWarning ? "warning" : "note"));
   item->setText(kKindColumn, TextOfKind(finding.kind));
-  item->setText(kPlaceColumn, place.isEmpty() ? PathText(finding) : place);
+  item->setText(kPlaceColumn, place.isEmpty() ? PathText(finding) : TranslatedPlace(place));
   item->setText(kTextColumn, text);
   item->setToolTip(kTextColumn, text);
   item->setToolTip(kPlaceColumn, PathText(finding));

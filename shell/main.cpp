@@ -4,6 +4,7 @@
 #include <QDeadlineTimer>
 #include <QDir>
 #include <QImage>
+#include <QLibraryInfo>
 #include <QTemporaryDir>
 #include <QTimer>
 #include <QTranslator>
@@ -28,6 +29,7 @@
 #include "shell/relief/relief_canvas.h"
 #include "shell/relief/relief_window.h"
 #include "shell/report_pdf.h"
+#include "shell/widgets/catalogue_translator.h"
 #include "shell/widgets/plot_frame.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -39,7 +41,7 @@ using namespace tervane;
 struct Typed {
   std::vector<std::string> files;
   bool text = false;
-  std::string page, below, size, screenshot, appearance, dialog, relief, report;
+  std::string page, below, size, screenshot, appearance, dialog, relief, report, language = "en";
   ReportOptions reported;
   std::vector<std::string> answers;
   double zoom = 0;
@@ -229,6 +231,8 @@ int main(int argc, char** argv) {
         return ParseSize(text).isValid() ? std::string() : "a size as 1280x800 was expected";
       });
   commandLine.add_option("--appearance", typed.appearance, "light or dark")->check(CLI::IsMember({"light", "dark"}));
+  commandLine.add_option("--language", typed.language, "The language of menus, pages and findings: en or de")
+      ->check(CLI::IsMember({"en", "de"}));
   commandLine.add_option("--screenshot", typed.screenshot, "Draw the window into this picture and end");
   commandLine.add_option("--dialog", typed.dialog, "Draw the dialog that this button of the page opens");
   commandLine
@@ -258,9 +262,13 @@ int main(int argc, char** argv) {
   Application application(argc, argv);
   QApplication::setApplicationName("Quarzel");
   QApplication::setApplicationVersion(kProgramVersion);
-  QTranslator translator;
-  if (translator.load(QLocale(), "quarzel", "_", QApplication::applicationDirPath() + "/translations"))
-    QApplication::installTranslator(&translator);
+  // The toolkit has texts of its own, those of dialogs, where its translations are installed.
+  QTranslator ofToolkit;
+  if (typed.language != "en" &&
+      ofToolkit.load("qtbase_" + ToQt(typed.language), QLibraryInfo::path(QLibraryInfo::TranslationsPath)))
+    QApplication::installTranslator(&ofToolkit);
+  CatalogueTranslator translator(ToQt(typed.language));
+  QApplication::installTranslator(&translator);
   try {
     return typed.report.empty() ? Run(typed, application) : DrawReport(typed);
   } catch (const std::bad_alloc&) {

@@ -249,7 +249,7 @@ void MainWindow::BuildViewMenu() {
                  [](DocumentFrame& frame) { frame.StepFinding(1); });
   AddForDocument(view, tr("&Previous Finding"), nullptr, QKeySequence(Qt::SHIFT | Qt::Key_F8),
                  [](DocumentFrame& frame) { frame.StepFinding(-1); });
-  Command& marks = AddForDocument(view, "Show &Validation Icons", nullptr, {}, [](DocumentFrame& frame) {
+  Command& marks = AddForDocument(view, tr("Show &Validation Icons"), nullptr, {}, [](DocumentFrame& frame) {
     CViewSettingsKvf& settings = ViewSettingsOf(frame);
     settings.ShowValidationIcons = settings.ShowValidationIcons ? 0 : 1;
     frame.Change(settings, kDataChanged, tr("Show Validation Icons"));
