@@ -439,26 +439,6 @@ void DocumentFrame::Commit() {
   text_->Commit();
 }
 
-void DocumentFrame::Undo() {
-  if (!text_->UndoTyping()) Step(&EditSession::Undo, &UndoStack::UndoPlace, &UndoStack::UndoName, tr("Undone: %1"));
-}
-
-void DocumentFrame::Redo() {
-  if (!text_->RedoTyping()) Step(&EditSession::Redo, &UndoStack::RedoPlace, &UndoStack::RedoName, tr("Done again: %1"));
-}
-
-void DocumentFrame::Step(bool (EditSession::*step)(), StepPlace (UndoStack::*placeOf)() const,
-                         std::string (UndoStack::*nameOf)() const, const QString& told) {
-  Commit();
-  if (page_) page_->DropRefused();
-  const StepPlace place = (session_->Steps().*placeOf)();
-  const std::string name = (session_->Steps().*nameOf)();
-  if (!(*session_.*step)()) return;
-  // A command of the menus has no page: what it has changed is seen where it stands.
-  if (GoTo(place.node) && page_) page_->PointOut(place.control);
-  emit Told(told.arg(Translated(name)));
-}
-
 void DocumentFrame::Change(CYbSEKvfBase& node, int hint, const QString& action) {
   session_->UpdateDoc(node, hint, FromQt(action));
 }

@@ -1,7 +1,7 @@
 // Copyright (C) 2026 the Tervane developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// The text of the setup beside its pages.
+// The text of the setup beside its pages, and undo, which what is being typed there comes before.
 #include <QTabBar>
 #include <QTabWidget>
 
@@ -9,6 +9,7 @@
 #include "shell/find_panel.h"
 #include "shell/page/page_view.h"
 #include "shell/text/text_view.h"
+#include "shell/widgets/qt_text.h"
 
 namespace tervane {
 
@@ -45,6 +46,26 @@ void DocumentFrame::FollowInText(const CYbSEKvfBase& node, const std::string& co
 }
 
 void DocumentFrame::StartFind() { IsTextShown() ? text_->StartFind() : find_->Start(); }
+
+void DocumentFrame::Undo() {
+  if (!text_->UndoTyping()) Step(&EditSession::Undo, &UndoStack::UndoPlace, &UndoStack::UndoName, tr("Undone: %1"));
+}
+
+void DocumentFrame::Redo() {
+  if (!text_->RedoTyping()) Step(&EditSession::Redo, &UndoStack::RedoPlace, &UndoStack::RedoName, tr("Done again: %1"));
+}
+
+void DocumentFrame::Step(bool (EditSession::*step)(), StepPlace (UndoStack::*placeOf)() const,
+                         std::string (UndoStack::*nameOf)() const, const QString& told) {
+  Commit();
+  if (page_) page_->DropRefused();
+  const StepPlace place = (session_->Steps().*placeOf)();
+  const std::string name = (session_->Steps().*nameOf)();
+  if (!(*session_.*step)()) return;
+  // A command of the menus has no page: what it has changed is seen where it stands.
+  if (GoTo(place.node) && page_) page_->PointOut(place.control);
+  emit Told(told.arg(Translated(name)));
+}
 
 bool DocumentFrame::CanUndo() const { return session_->Steps().CanUndo() || text_->HasTyping(); }
 
