@@ -288,7 +288,7 @@ void DocumentFrame::ShowPage(CYbSEKvfBase& node, const std::string& control) {
                         session_->UpdateDoc(node, hint, action, source, page_ ? page_->NameOf(source) : std::string());
                       }};
   context.displayUnits = &program_.Units();
-  context.isReplacement = isRebuilding_;
+  context.isReplacement = isRebuilding_ || isStepping_;
   context.syncSoon = [this] {
     QTimer::singleShot(0, this, [this] {
       if (page_) page_->Sync();

@@ -220,6 +220,7 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   std::ptrdiff_t place_ = -1;           ///< Of the shown node in `visited_`.
   bool isGoing_ = false;
   bool isRebuilding_ = false;
+  bool isStepping_ = false;  ///< A step is being undone or redone: what a page mends when it is shown would undo that.
   std::string lostPage_;  ///< The path of a page of processed data that a rebuild took away, until another is chosen.
   std::string toldProblem_;  ///< Of the report, as the log has it.
   bool isReportGone_ = false;

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 // The text of the setup beside its pages, and undo, which what is being typed there comes before.
-#include <QTabBar>
+#include <QScopedValueRollback>
 #include <QTabWidget>
 
 #include "shell/document_frame.h"
@@ -61,6 +61,7 @@ void DocumentFrame::Step(bool (EditSession::*step)(), StepPlace (UndoStack::*pla
   if (page_) page_->DropRefused();
   const StepPlace place = (session_->Steps().*placeOf)();
   const std::string name = (session_->Steps().*nameOf)();
+  const QScopedValueRollback stepping(isStepping_, true);
   if (!(*session_.*step)()) return;
   // A command of the menus has no page: what it has changed is seen where it stands.
   if (GoTo(place.node) && page_) page_->PointOut(place.control);
