@@ -15,24 +15,6 @@
 
 namespace tervane {
 
-namespace {
-
-std::string_view KindName(SetupDifference::Kind kind) {
-  switch (kind) {
-    case SetupDifference::Kind::Changed:
-      return "changed";
-    case SetupDifference::Kind::Added:
-      return "added";
-    case SetupDifference::Kind::Removed:
-      return "removed";
-    case SetupDifference::Kind::Moved:
-      return "moved";
-  }
-  return {};
-}
-
-}  // namespace
-
 std::string DifferenceLine(const SetupDifference& difference) {
   const std::string place =
       difference.key.empty() ? difference.path : fmt::format("{}:{}", difference.path, difference.key);
@@ -59,7 +41,7 @@ std::string DifferenceJson(const SetupDifference& difference) {
   const auto optional = [](const std::string& text) { return text.empty() ? std::string() : JsonQuoted(text); };
   return JsonObject({{"path", JsonQuoted(difference.path)},
                      {"key", optional(difference.key)},
-                     {"kind", JsonQuoted(KindName(difference.kind))},
+                     {"kind", JsonQuoted(NameOf(difference.kind))},
                      {"from", optional(difference.from)},
                      {"to", optional(difference.to)},
                      {"fromMeaning", optional(difference.fromMeaning)},

@@ -13,6 +13,7 @@
 #include "forms/section_profile.h"
 #include "pages/parts/ground_column.h"
 #include "pages/parts/ground_section.h"
+#include "platform/csv_cell.h"
 #include "platform/text.h"
 #include "subsurface/saturated_zone.h"
 
@@ -45,11 +46,7 @@ auto TakePlace(std::function<void(MapPoint)> take) {
 
 void PrintRow(const std::vector<std::string>& cells, std::ostream& out) {
   std::string line;
-  for (std::size_t i = 0; i < cells.size(); ++i) {
-    const bool needsQuotes = cells[i].find_first_of(",\"\n") != std::string::npos;
-    const std::string cell = OneLine(cells[i]);
-    line += (i > 0 ? "," : "") + (needsQuotes ? "\"" + Replaced(cell, "\"", "\"\"") + "\"" : cell);
-  }
+  for (std::size_t i = 0; i < cells.size(); ++i) line += (i > 0 ? "," : "") + CsvCell(OneLine(cells[i]));
   fmt::print(out, "{}\n", line);
 }
 

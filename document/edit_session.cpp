@@ -33,7 +33,7 @@ EditSession::~EditSession() {
   RemoveAutosavesBut({});
   try {
     if (journal_ && IsModified()) journal_->TakeEvent(*document_, "Close Without Saving");
-  } catch (const std::bad_alloc&) {
+  } catch (const std::exception&) {
     // The journal lacks its last line; nothing else is left to be done.
   }
 }

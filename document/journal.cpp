@@ -21,6 +21,7 @@
 #include <rapidjson/writer.h>
 
 #include "document/flow_model_document.h"
+#include "platform/csv_cell.h"
 #include "platform/files.h"
 #include "platform/os.h"
 #include "platform/paths.h"
@@ -30,7 +31,6 @@ namespace tervane {
 
 namespace {
 
-constexpr std::array<std::string_view, 4> kJournalKinds{"changed", "added", "removed", "moved"};
 /// What waits longer than this for a journal that can be written is given up, oldest first.
 constexpr std::size_t kMostWaiting = std::size_t{16} << 20;
 
@@ -71,14 +71,7 @@ bool TakeTexts(const journal_json::Value& value, Object& object, const Texts& te
   return true;
 }
 
-std::string CellText(const std::string& text) {
-  if (text.find_first_of(",\"\r\n") == std::string::npos) return text;
-  return "\"" + Replaced(text, "\"", "\"\"") + "\"";
-}
-
 }  // namespace
-
-std::string_view NameOf(SetupDifference::Kind kind) { return kJournalKinds[static_cast<std::size_t>(kind)]; }
 
 std::string JournalBeside(const std::string& setup) { return setup + ".journal"; }
 
@@ -122,9 +115,9 @@ std::optional<JournalStep> ReadJournalLine(std::string_view line, std::string& p
     if (!value.IsObject() || !TakeTexts(value, change, kChangeTexts)) return std::nullopt;
     if (const auto kind = value.FindMember("kind"); kind != value.MemberEnd()) {
       if (!kind->value.IsString()) return std::nullopt;
-      const auto known = std::ranges::find(kJournalKinds, std::string_view(kind->value.GetString()));
-      if (known == kJournalKinds.end()) return std::nullopt;
-      change.kind = static_cast<SetupDifference::Kind>(known - kJournalKinds.begin());
+      const auto known = std::ranges::find(kDifferenceKinds, std::string_view(kind->value.GetString()));
+      if (known == std::end(kDifferenceKinds)) return std::nullopt;
+      change.kind = static_cast<SetupDifference::Kind>(known - std::begin(kDifferenceKinds));
     }
     step.changes.push_back(std::move(change));
   }
@@ -207,11 +200,11 @@ std::string JournalCsv(const std::vector<JournalStep>& steps) {
   std::string table = "time,user,action,page,kind,path,key,from,to\n";
   for (const JournalStep& step : steps) {
     std::string head;
-    for (const auto& [name, member] : kStepTexts) head += CellText(step.*member) + ",";
+    for (const auto& [name, member] : kStepTexts) head += CsvCell(step.*member) + ",";
     if (step.changes.empty()) table += head + ",,,,\n";
     for (const JournalChange& change : step.changes) {
       table += head + std::string(NameOf(change.kind));
-      for (const auto& [name, member] : kChangeTexts) table += "," + CellText(change.*member);
+      for (const auto& [name, member] : kChangeTexts) table += "," + CsvCell(change.*member);
       table += '\n';
     }
   }

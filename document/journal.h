@@ -24,9 +24,6 @@ struct JournalChange {
 
   bool operator==(const JournalChange&) const = default;
 };
-/// "changed", "added", "removed", "moved".
-std::string_view NameOf(SetupDifference::Kind kind);
-
 struct JournalStep {
   std::string time;  ///< "2026-11-27 08:30:15", local.
   std::string user;

@@ -27,6 +27,10 @@ struct SetupDifference {
   std::string toMeaning = {};
 };
 
+/// What the kinds of differences are called.
+inline constexpr std::string_view kDifferenceKinds[] = {"changed", "added", "removed", "moved"};
+inline std::string_view NameOf(SetupDifference::Kind kind) { return kDifferenceKinds[static_cast<std::size_t>(kind)]; }
+
 /// The values of a key as two files are compared: numbers behind the name of a file are made at each save.
 std::string ComparedText(const KvfNode& keyword);
 

@@ -193,6 +193,8 @@ void DocumentFrame::Redraw() {
   const std::uint64_t current = current_;
   const QStringList branches = Branches();
   const int tab = treeTabs_->currentIndex(), bottom = bottomTabs_->currentIndex();
+  const bool isText = IsTextShown();
+  const QString typed = text_->HasTyping() ? text_->Text().toPlainText() : QString();
   delete columns_;
   current_ = 0;
   BuildBody();
@@ -204,6 +206,8 @@ void DocumentFrame::Redraw() {
   isGoing_ = true;
   GoTo(current);
   isGoing_ = false;
+  ShowText(isText);
+  if (!typed.isEmpty()) text_->Resume(typed);
 }
 
 QString DocumentFrame::Name() const {

@@ -74,6 +74,8 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   /// of the cursor.
   void ShowText(bool isShown);
   bool IsTextShown() const;
+  /// Whether the text holds lines that the setup has not taken and that would be lost with it.
+  bool HasUntakenText() const;
   /// The page's own help; false when it has none.
   bool OnHelp();
   /// What takes no part, and what would bring it.
@@ -113,7 +115,7 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   void Fix(const QString& kind, const std::vector<SetupFinding>& findings);
   /// Asks for a review note at a node, or at a key of it, and adds it.
   void AddNote(std::uint64_t serial, const std::string& key);
-  /// The same at the control that has the keyboard, else at the page.
+  /// The same at the control or line that has the keyboard, else at the page.
   void AddNoteHere();
   void Log(const QString& line);
   /// Makes all anew that was computed from colours and sizes.
@@ -174,8 +176,6 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   /// Shows the notes in their list, in the trees and on the page.
   void ShowNotes();
   void ShowNotesOnPage();
-  /// Gives notes the new places of nodes that were moved or renamed by the latest step, as a part of it.
-  void FollowNotedNodes();
   void OnRunEnd(bool isDone, bool wasFound);
   /// The first error that the engine has told in its latest run, as a sentence with its place and how many there are.
   struct ToldError {
@@ -202,7 +202,6 @@ class DocumentFrame : public QWidget, public MessageReceiver {
   FindingsView* findings_ = nullptr;
   NotesView* notes_ = nullptr;
   JournalView* journal_ = nullptr;
-  std::map<std::string, std::uint64_t> noteNodes_;  ///< Where each note stood when it was last looked at.
   std::map<std::pair<std::uint64_t, std::string>, QString> noted_;  ///< Notes that are not done, by node and key.
   std::unique_ptr<DocumentRun> run_;
   LogView *log_ = nullptr, *riverLog_ = nullptr;

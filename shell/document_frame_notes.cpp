@@ -12,12 +12,13 @@
 #include "shell/notes_view.h"
 #include "shell/page/page_view.h"
 #include "shell/qt_host.h"
+#include "shell/text/text_view.h"
 #include "shell/widgets/qt_text.h"
 
 namespace tervane {
 
 void DocumentFrame::BuildNotes() {
-  notes_ = new NotesView(*session_, host_, program_);
+  notes_ = new NotesView(*session_, host_, program_, [this](std::uint64_t serial) { return NodeOf(serial); });
   bottomTabs_->addTab(notes_, tr("Notes"));
   connect(notes_, &NotesView::NoteChosen, this,
           [this](quint64 serial, const QString& key) { GoTo(serial, FromQt(key)); });
@@ -28,51 +29,30 @@ void DocumentFrame::BuildNotes() {
 void DocumentFrame::AddNote(std::uint64_t serial, const std::string& key) {
   Commit();
   CYbSEKvfBase* node = NodeOf(serial);
-  if (!node || session_->IsReadOnly()) return;
+  if (!node) return;
   bottomTabs_->setCurrentWidget(notes_);
   notes_->AddAt(*node, key);
 }
 
 void DocumentFrame::AddNoteHere() {
+  if (const TextView::Place place = IsTextShown() ? text_->PlaceAtCursor() : TextView::Place(); place.serial)
+    return AddNote(place.serial, place.key);
   const auto [serial, key] = page_ ? page_->KeyWithFocus() : std::pair<std::uint64_t, std::string>();
   AddNote(serial ? serial : current_, key);
 }
 
-void DocumentFrame::FollowNotedNodes() {
-  CYbSEKvfGlobalBase& root = session_->Document().Root();
-  auto* list = root.Child<CExtraParamsKvf>();
-  bool hasFollowed = false;
-  for (ReviewNote& note : ReviewNotesOf(*list)) {
-    if (note.place.empty()) continue;
-    CYbSEKvfBase* found = NodeOfReviewNote(root, note);
-    const auto known = noteNodes_.find(note.name);
-    // Undo and redo bring the note back with its node; a node that is no more leaves its notes behind.
-    if (known != noteNodes_.end()) {
-      if (!found || found->Serial() != known->second)
-        if (CYbSEKvfBase* node = NodeOf(known->second)) found = node;
-      // Undo and redo bring notes to where they stood, and what follows them would be no part of their steps.
-      if (found && !session_->Steps().CanRedo() && FollowNode(note, *found)) {
-        PutReviewNote(*list, note);
-        hasFollowed = true;
-      }
-    }
-    if (found) noteNodes_[note.name] = found->Serial();
-  }
-  if (hasFollowed) session_->JoinStep();
-}
-
 void DocumentFrame::ShowNotes() {
-  FollowNotedNodes();
   notes_->Sync();
   const int count = notes_->OpenCount();
   bottomTabs_->setTabText(bottomTabs_->indexOf(notes_), count ? tr("Notes (%1)").arg(count) : tr("Notes"));
   noted_.clear();
   std::map<std::uint64_t, int> ofPages;
-  for (const ReviewNote& note : notes_->Notes()) {
-    CYbSEKvfBase* node = NodeOfReviewNote(session_->Document().Root(), note);
+  for (const NotesView::PlacedNote& placed : notes_->Notes()) {
+    const ReviewNote& note = placed.note;
+    CYbSEKvfBase* node = placed.serial ? NodeOf(placed.serial) : nullptr;
     if (!node || note.place.empty() || note.state == ReviewState::Done) continue;
     const QString text = tr("%1 (%2, %3)").arg(ToQt(note.text), ToQt(note.author), ToQt(note.date));
-    QString& told = noted_[{node->Serial(), ParseSetupPath(note.place).key.name}];
+    QString& told = noted_[{placed.serial, ParseSetupPath(note.place).key.name}];
     told += (told.isEmpty() ? "" : "\n") + text;
     if (const CYbSEKvfBase* shown = PlaceNames::PageNodeOf(*node)) ++ofPages[shown->Serial()];
   }

@@ -68,6 +68,8 @@ void DocumentFrame::Step(bool (EditSession::*step)(), StepPlace (UndoStack::*pla
   emit Told(told.arg(Translated(name)));
 }
 
+bool DocumentFrame::HasUntakenText() const { return text_->HasTyping(); }
+
 bool DocumentFrame::CanUndo() const { return session_->Steps().CanUndo() || text_->HasTyping(); }
 
 bool DocumentFrame::CanRedo() const { return session_->Steps().CanRedo() || text_->HasTyping(); }

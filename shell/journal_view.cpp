@@ -16,6 +16,7 @@
 #include "core/host.h"
 #include "pages/place_names.h"
 #include "shell/program.h"
+#include "shell/widgets/flat_button.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/row_delegate.h"
 #include "shell/widgets/theme.h"
@@ -31,20 +32,6 @@ enum JournalColumn { kJournalTime, kJournalUser, kJournalStep, kJournalPlace, kJ
 enum JournalRole { kJournalStepRole = Qt::UserRole, kJournalPathRole, kJournalKeyRole };
 
 QString JournalText(const std::string& text) { return ToQt(text).simplified(); }
-
-QString JournalKindText(SetupDifference::Kind kind) {
-  switch (kind) {
-    case SetupDifference::Kind::Added:
-      return JournalView::tr("added");
-    case SetupDifference::Kind::Removed:
-      return JournalView::tr("removed");
-    case SetupDifference::Kind::Moved:
-      return JournalView::tr("moved");
-    case SetupDifference::Kind::Changed:
-      break;
-  }
-  return {};
-}
 
 }  // namespace
 
@@ -75,18 +62,9 @@ JournalView::JournalView(EditSession& session, Host& host, Program& program, std
   row->addWidget(filter_, 1);
   row->addWidget(told_);
   row->addStretch(1);
-  const auto button = [&](const QString& text, auto run) {
-    auto* made = new QToolButton;
-    made->setText(text);
-    made->setAutoRaise(true);
-    made->setFocusPolicy(Qt::TabFocus);
-    connect(made, &QToolButton::clicked, this, run);
-    row->addWidget(made);
-    return made;
-  };
-  takeBack_ = button(tr("Take Back"), [this] { TakeBack(); });
+  takeBack_ = AddFlatButton(*row, tr("Take Back"), [this] { TakeBack(); });
   takeBack_->setToolTip(tr("Gives the keys of the chosen step the values that they had before it"));
-  export_ = button(tr("Export…"), [this] {
+  export_ = AddFlatButton(*row, tr("Export…"), [this] {
     const QString path = QFileDialog::getSaveFileName(window(), tr("Export Journal"), tr("journal.csv"),
                                                       tr("Tables separated by commas (*.csv)"));
     if (!path.isEmpty()) ExportTo(FromQt(path));
@@ -199,8 +177,9 @@ void JournalView::Fill() {
     item.setText(kJournalPlace, placeOf(change.path, change.key));
     item.setToolTip(kJournalPlace, ToQt(change.key.empty() ? change.path : change.path + ":" + change.key));
     item.setText(kJournalBefore, JournalText(change.from));
-    item.setText(kJournalAfter,
-                 change.kind == SetupDifference::Kind::Changed ? JournalText(change.to) : JournalKindText(change.kind));
+    item.setText(kJournalAfter, change.kind == SetupDifference::Kind::Changed
+                                    ? JournalText(change.to)
+                                    : Translated(std::string(NameOf(change.kind))));
     item.setToolTip(kJournalBefore, ToQt(change.from));
     item.setToolTip(kJournalAfter, ToQt(change.to));
     item.setData(0, kJournalPathRole, ToQt(change.path));

@@ -205,9 +205,8 @@ void MainWindow::BuildEditMenu() {
   forward(tr("Fill &Down\tCtrl+D"), "fillDown");
   edit->addSeparator();
   AddForDocument(edit, tr("&Find…"), "find", QKeySequence::Find, [](DocumentFrame& frame) { frame.StartFind(); });
-  Command& note = AddForDocument(edit, tr("Add &Note…"), "review", QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_N),
-                                 [](DocumentFrame& frame) { frame.AddNoteHere(); });
-  note.enabled = [this] { return Frame() && !Frame()->Session().IsReadOnly(); };
+  AddForDocument(edit, tr("Add &Note…"), "review", QKeySequence(Qt::CTRL | Qt::ALT | Qt::Key_N),
+                 [](DocumentFrame& frame) { frame.AddNoteHere(); });
   AddForDocument(edit, tr("Copy Pat&h"), nullptr, QKeySequence(Qt::CTRL | Qt::SHIFT | Qt::Key_C),
                  [](DocumentFrame& frame) { QApplication::clipboard()->setText(ToQt(frame.CurrentPath())); });
   standardBar_->addActions({undo.action, redo.action});

@@ -280,6 +280,7 @@ bool MainWindow::OpenFile(const QString& path) {
 void MainWindow::ReloadDocument(DocumentFrame* frame) {
   const QString path = ToQt(frame->Session().Path());
   const std::string place = frame->CurrentPath();
+  if (!MayDropText(*frame)) return frame->CheckDisk();
   if (frame->Session().IsModified() && frame->Session().HasChangesToSave() &&
       host_.Ask(FromQt(tr("Throw your own changes to %1 away and read the file again?").arg(frame->Name())),
                 Host::Icon::Warning, Host::Buttons::YesNo) != Host::Answer::Yes) {
@@ -372,10 +373,20 @@ bool MainWindow::CloseTab(QWidget* tab) {
   return true;
 }
 
+bool MainWindow::MayDropText(DocumentFrame& frame) {
+  if (!frame.HasUntakenText()) return true;
+  frame.ShowText(true);
+  return host_.Ask(FromQt(tr("The text of %1 holds lines that the setup has not taken; they are told below the text. "
+                             "Give them up?")
+                              .arg(frame.Name())),
+                   Host::Icon::Warning, Host::Buttons::YesNo) == Host::Answer::Yes;
+}
+
 bool MainWindow::CloseDocument(DocumentFrame* frame) {
   if (!frame) return true;
   tabs_->setCurrentWidget(frame);
   frame->Commit();
+  if (!MayDropText(*frame)) return false;
   if (frame->Session().HasChangesToSave()) {
     const int answer = AskForChanges(frame->Name());
     if (answer == QMessageBox::Save && !SaveDocument()) return false;

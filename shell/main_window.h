@@ -80,6 +80,8 @@ class MainWindow : public QMainWindow, public MessageReceiver {
   bool SaveEditor();
   bool SaveEditorAs();
   /// False when the user wants to go on with it.
+  /// False where the user keeps what is typed in the text and not taken.
+  bool MayDropText(DocumentFrame& frame);
   bool CloseDocument(DocumentFrame* frame);
   bool CloseEditor(EditTab* editor);
   /// The same of any tab.

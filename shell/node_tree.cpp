@@ -150,7 +150,10 @@ void NodeTree::ShowNotes(const std::map<std::uint64_t, int>& counts) {
     const int count = found == counts.end() ? 0 : found->second;
     if (items_[i]->data(0, kNotesRole).toInt() == count) continue;
     items_[i]->setData(0, kNotesRole, count);
-    items_[i]->setData(0, Qt::AccessibleDescriptionRole, count ? tr("%n review note(s)", nullptr, count) : QString());
+    items_[i]->setData(0, Qt::AccessibleDescriptionRole,
+                       count == 0   ? QString()
+                       : count == 1 ? tr("1 review note")
+                                    : tr("%1 review notes").arg(count));
   }
 }
 

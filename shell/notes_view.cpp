@@ -27,6 +27,7 @@
 #include "platform/os.h"
 #include "platform/text.h"
 #include "shell/program.h"
+#include "shell/widgets/flat_button.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/row_delegate.h"
 #include "shell/widgets/theme.h"
@@ -84,8 +85,13 @@ void NoteDialog::accept() {
 
 // ---- The list
 
-NotesView::NotesView(EditSession& session, Host& host, Program& program)
-    : session_(session), host_(host), program_(program), filter_(new QComboBox), list_(new QTreeWidget) {
+NotesView::NotesView(EditSession& session, Host& host, Program& program, NodeOf nodeOf)
+    : session_(session),
+      host_(host),
+      program_(program),
+      nodeOf_(std::move(nodeOf)),
+      filter_(new QComboBox),
+      list_(new QTreeWidget) {
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(0);
@@ -96,25 +102,16 @@ NotesView::NotesView(EditSession& session, Host& host, Program& program)
     filter_->addItem(StateText(state), static_cast<int>(state));
   filter_->setAccessibleName(tr("Which notes are listed"));
   row->addWidget(filter_);
-  const auto button = [&](const QString& text, auto run) {
-    auto* made = new QToolButton;
-    made->setText(text);
-    made->setAutoRaise(true);
-    made->setFocusPolicy(Qt::TabFocus);
-    connect(made, &QToolButton::clicked, this, run);
-    row->addWidget(made);
-    return made;
-  };
-  answer_ = button(tr("Ans&wer…"), [this] { AskForAnswer(); });
-  done_ = button(tr("Done"), [this] {
-    if (const ReviewNote* note = Chosen())
-      SetState(note->name, note->state == ReviewState::Done ? ReviewState::Open : ReviewState::Done);
+  answer_ = AddFlatButton(*row, tr("Ans&wer…"), [this] { AskForAnswer(); });
+  done_ = AddFlatButton(*row, tr("Done"), [this] {
+    if (const PlacedNote* chosen = Chosen())
+      SetState(chosen->note.name, chosen->note.state == ReviewState::Done ? ReviewState::Open : ReviewState::Done);
   });
-  remove_ = button(tr("Remove"), [this] {
-    if (const ReviewNote* note = Chosen()) Remove(note->name);
+  remove_ = AddFlatButton(*row, tr("Remove"), [this] {
+    if (const PlacedNote* chosen = Chosen()) Remove(chosen->note.name);
   });
   row->addStretch(1);
-  export_ = button(tr("Export…"), [this] { Export(); });
+  export_ = AddFlatButton(*row, tr("Export…"), [this] { Export(); });
   column->addLayout(row);
   column->addWidget(list_, 1);
 
@@ -139,40 +136,56 @@ NotesView::NotesView(EditSession& session, Host& host, Program& program)
 CExtraParamsKvf& NotesView::List() const { return *session_.Document().Root().Child<CExtraParamsKvf>(); }
 
 void NotesView::Sync() {
-  std::vector<ReviewNote> notes = ReviewNotesOf(List());
-  // What a place is called is found on its page, which takes a while: only for what has changed.
-  std::vector<std::uint64_t> nodes;
-  for (const ReviewNote& note : notes) {
-    const CYbSEKvfBase* node = NodeOfReviewNote(session_.Document().Root(), note);
-    nodes.push_back(node ? node->Serial() : 0);
+  CYbSEKvfGlobalBase& root = session_.Document().Root();
+  std::vector<PlacedNote> notes;
+  bool hasFollowed = false;
+  for (ReviewNote& note : ReviewNotesOf(List())) {
+    CYbSEKvfBase* node = NodeOfReviewNote(root, note);
+    const PlacedNote* before = Find(note.name);
+    if (before && before->serial && (!node || node->Serial() != before->serial))
+      if (CYbSEKvfBase* same = nodeOf_(before->serial)) node = same;
+    // Undo and redo bring notes to where they stood, and what follows them would be no part of their steps.
+    if (before && node && !note.place.empty() && !session_.Steps().CanRedo() && FollowNode(note, *node)) {
+      PutReviewNote(List(), note);
+      hasFollowed = true;
+    }
+    notes.push_back({std::move(note), node ? node->Serial() : 0});
   }
-  if (notes == notes_ && nodes == nodes_) return;
+  if (hasFollowed) session_.JoinStep();
+  // What a place is called is found on its page, which takes a while: only for what has changed.
+  if (notes == notes_) return;
   notes_ = std::move(notes);
-  nodes_ = std::move(nodes);
   Fill();
 }
 
 int NotesView::OpenCount() const {
   return static_cast<int>(
-      std::ranges::count_if(notes_, [](const ReviewNote& note) { return note.state != ReviewState::Done; }));
+      std::ranges::count_if(notes_, [](const PlacedNote& placed) { return placed.note.state != ReviewState::Done; }));
 }
 
-QString NotesView::PlaceOf(const ReviewNote& note) {
-  if (note.place.empty()) return tr("The whole setup");
-  CYbSEKvfBase* node = NodeOfReviewNote(session_.Document().Root(), note);
-  if (!node) return tr("%1 (gone)").arg(ToQt(note.place));
-  return ToQt(PlaceNames(session_.Document()).Of(*node, PathOf(*node), ParseSetupPath(note.place).key.name));
+const NotesView::PlacedNote* NotesView::Find(const std::string& name) const {
+  const auto found = std::ranges::find_if(notes_, [&](const PlacedNote& placed) { return placed.note.name == name; });
+  return found == notes_.end() ? nullptr : &*found;
 }
 
 void NotesView::Fill() {
   const QTreeWidgetItem* current = list_->currentItem();
   const QString chosen = current ? current->data(0, Qt::UserRole).toString() : QString();
   list_->clear();
-  for (const ReviewNote& note : notes_) {
+  PlaceNames names(session_.Document());
+  const auto placeOf = [&](const PlacedNote& placed) {
+    const ReviewNote& note = placed.note;
+    if (note.place.empty()) return tr("The whole setup");
+    CYbSEKvfBase* node = placed.serial ? nodeOf_(placed.serial) : nullptr;
+    return node ? ToQt(names.Of(*node, PathOf(*node), ParseSetupPath(note.place).key.name))
+                : tr("%1 (gone)").arg(ToQt(note.place));
+  };
+  for (const PlacedNote& placed : notes_) {
+    const ReviewNote& note = placed.note;
     if (filter_->currentData().isValid() && filter_->currentData().toInt() != static_cast<int>(note.state)) continue;
     const auto text = [](const std::string& said) { return ToQt(said).replace('\n', ' '); };
     auto* item = new QTreeWidgetItem(
-        list_, {StateText(note.state), PlaceOf(note), text(note.text), ToQt(note.author), ToQt(note.date)});
+        list_, {StateText(note.state), placeOf(placed), text(note.text), ToQt(note.author), ToQt(note.date)});
     item->setData(0, Qt::UserRole, ToQt(note.name));
     item->setToolTip(2, ToQt(note.text));
     if (note.state != ReviewState::Done) item->setIcon(0, Theme::Get().Icon("review"));
@@ -188,26 +201,23 @@ void NotesView::Fill() {
   SyncButtons();
 }
 
-const ReviewNote* NotesView::Chosen() const {
+const NotesView::PlacedNote* NotesView::Chosen() const {
   const QTreeWidgetItem* item = list_->currentItem();
-  const std::string name = item ? FromQt(item->data(0, Qt::UserRole).toString()) : std::string();
-  const auto found = std::ranges::find(notes_, name, &ReviewNote::name);
-  return found == notes_.end() ? nullptr : &*found;
+  return item ? Find(FromQt(item->data(0, Qt::UserRole).toString())) : nullptr;
 }
 
 void NotesView::SyncButtons() {
-  const ReviewNote* note = Chosen();
-  for (QToolButton* button : {answer_, done_, remove_}) button->setEnabled(note != nullptr);
-  done_->setText(note && note->state == ReviewState::Done ? tr("Open Again") : tr("Done"));
+  const PlacedNote* chosen = Chosen();
+  for (QToolButton* button : {answer_, done_, remove_}) button->setEnabled(chosen != nullptr);
+  done_->setText(chosen && chosen->note.state == ReviewState::Done ? tr("Open Again") : tr("Done"));
   export_->setEnabled(!notes_.empty());
 }
 
 void NotesView::Choose(const QTreeWidgetItem* item) {
   list_->setCurrentItem(const_cast<QTreeWidgetItem*>(item));
-  const ReviewNote* note = Chosen();
-  if (!note) return;
-  if (const CYbSEKvfBase* node = NodeOfReviewNote(session_.Document().Root(), *note); node && !note->place.empty())
-    emit NoteChosen(node->Serial(), ToQt(ParseSetupPath(note->place).key.name));
+  const PlacedNote* chosen = Chosen();
+  if (chosen && chosen->serial && !chosen->note.place.empty())
+    emit NoteChosen(chosen->serial, ToQt(ParseSetupPath(chosen->note.place).key.name));
 }
 
 void NotesView::Select(const std::string& name) {
@@ -246,12 +256,7 @@ void NotesView::AddAt(CYbSEKvfBase& node, const std::string& key) {
   NoteDialog dialog(tr("Add Note"), about, program_, window());
   if (dialog.exec() != QDialog::Accepted) return;
   // What was asked for a while may be gone.
-  CYbSEKvfBase* now = nullptr;
-  WalkNodes(session_.Document().Root(), [&](const NodePlace& place) {
-    if (place.node.Serial() == serial) now = &place.node;
-  });
-  if (!now && !node.GetParent()) now = &session_.Document().Root();
-  if (now) Add(*now, key, dialog.Author(), dialog.Text());
+  if (CYbSEKvfBase* now = nodeOf_(serial)) Add(*now, key, dialog.Author(), dialog.Text());
 }
 
 void NotesView::Add(CYbSEKvfBase& node, const std::string& key, const std::string& author, const std::string& text) {
@@ -265,9 +270,9 @@ void NotesView::Add(CYbSEKvfBase& node, const std::string& key, const std::strin
 }
 
 void NotesView::Answer(const std::string& name, const std::string& author, const std::string& text) {
-  const auto found = std::ranges::find(notes_, name, &ReviewNote::name);
-  if (found == notes_.end()) return;
-  ReviewNote note = *found;
+  const PlacedNote* found = Find(name);
+  if (!found) return;
+  ReviewNote note = found->note;
   note.answers.push_back({author, TimeOfNow(), text});
   if (note.state == ReviewState::Open) note.state = ReviewState::Answered;
   PutReviewNote(List(), note);
@@ -275,26 +280,26 @@ void NotesView::Answer(const std::string& name, const std::string& author, const
 }
 
 void NotesView::SetState(const std::string& name, ReviewState state) {
-  const auto found = std::ranges::find(notes_, name, &ReviewNote::name);
-  if (found == notes_.end()) return;
-  ReviewNote note = *found;
+  const PlacedNote* found = Find(name);
+  if (!found) return;
+  ReviewNote note = found->note;
   note.state = state;
   PutReviewNote(List(), note);
   Change(note, kDataChanged, "Change State of Note");
 }
 
 void NotesView::Remove(const std::string& name) {
-  const auto found = std::ranges::find(notes_, name, &ReviewNote::name);
-  if (found == notes_.end()) return;
-  const ReviewNote note = *found;
+  const PlacedNote* found = Find(name);
+  if (!found) return;
+  const ReviewNote note = found->note;
   if (RemoveReviewNote(List(), name)) Change(note, kDataChanged | kItemDeleted, "Remove Note");
 }
 
 void NotesView::AskForAnswer() {
-  const ReviewNote* note = Chosen();
-  if (!note) return;
-  const std::string name = note->name;
-  NoteDialog dialog(tr("Answer Note"), ToQt(note->text), program_, window());
+  const PlacedNote* chosen = Chosen();
+  if (!chosen) return;
+  const std::string name = chosen->note.name;
+  NoteDialog dialog(tr("Answer Note"), ToQt(chosen->note.text), program_, window());
   if (dialog.exec() == QDialog::Accepted) Answer(name, dialog.Author(), dialog.Text());
 }
 
@@ -302,7 +307,8 @@ void NotesView::Export() {
   const QString path = QFileDialog::getSaveFileName(window(), tr("Export Review Notes"), tr("notes.csv"),
                                                     tr("Tables separated by commas (*.csv)"));
   if (path.isEmpty()) return;
-  if (const FileResult result = WriteFileAtomically(FromQt(path), ReviewNotesAsCsv(notes_)); !result.Ok())
+  if (const FileResult result = WriteFileAtomically(FromQt(path), ReviewNotesAsCsv(ReviewNotesOf(List())));
+      !result.Ok())
     host_.ShowMessage(result.error, Host::Icon::Error);
 }
 

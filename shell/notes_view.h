@@ -4,7 +4,8 @@
 
 #include <QDialog>
 #include <QWidget>
-#include <optional>
+#include <cstdint>
+#include <functional>
 #include <vector>
 
 #include "document/edit_session.h"
@@ -47,11 +48,20 @@ class NotesView : public QWidget {
   Q_OBJECT
 
  public:
-  NotesView(EditSession& session, Host& host, Program& program);
+  /// The node of a serial number, or null.
+  using NodeOf = std::function<CYbSEKvfBase*(std::uint64_t serial)>;
+  struct PlacedNote {
+    ReviewNote note;
+    std::uint64_t serial;  ///< Of the node at which it stands; 0 where its place is gone.
 
-  /// Follows the setup.
+    bool operator==(const PlacedNote&) const = default;
+  };
+
+  NotesView(EditSession& session, Host& host, Program& program, NodeOf nodeOf);
+
+  /// Follows the setup, and has notes follow nodes that were moved or renamed by the latest step, as a part of it.
   void Sync();
-  const std::vector<ReviewNote>& Notes() const { return notes_; }
+  const std::vector<PlacedNote>& Notes() const { return notes_; }
   /// Notes that are not done.
   int OpenCount() const;
   /// Asks for a note at a node, or at a key of it, and adds it.
@@ -69,8 +79,8 @@ class NotesView : public QWidget {
 
  private:
   CExtraParamsKvf& List() const;
-  QString PlaceOf(const ReviewNote& note);
-  const ReviewNote* Chosen() const;
+  const PlacedNote* Find(const std::string& name) const;
+  const PlacedNote* Chosen() const;
   void Fill();
   void Choose(const QTreeWidgetItem* item);
   void ShowMenu(const QPoint& place);
@@ -82,8 +92,8 @@ class NotesView : public QWidget {
   EditSession& session_;
   Host& host_;
   Program& program_;
-  std::vector<ReviewNote> notes_;
-  std::vector<std::uint64_t> nodes_;  ///< Where each of them stands; 0 where its place is gone.
+  NodeOf nodeOf_;
+  std::vector<PlacedNote> notes_;
   QComboBox* filter_;
   QTreeWidget* list_;
   QToolButton *answer_, *done_, *remove_, *export_;

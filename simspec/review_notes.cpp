@@ -10,7 +10,7 @@
 #include "core/kvf.h"
 #include "core/kvf_parser.h"
 #include "core/kvf_writer.h"
-#include "platform/text.h"
+#include "platform/csv_cell.h"
 
 namespace tervane {
 
@@ -133,9 +133,7 @@ std::string ReviewNotesAsCsv(const std::vector<ReviewNote>& notes) {
     std::string_view separator;
     for (const std::string_view cell : cells) {
       csv += separator;
-      csv += '"';
-      for (const char c : cell) csv.append(c == '"' ? 2 : 1, c);
-      csv += '"';
+      csv += CsvCell(cell);
       separator = ",";
     }
     csv += "\r\n";

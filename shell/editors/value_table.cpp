@@ -25,6 +25,7 @@ void ValueTable::FollowTheme() {
   setFont(QApplication::font());
   verticalHeader()->setDefaultSectionSize(fontMetrics().height() + Theme::Get().Scaled(6));
   horizontalHeader()->setDefaultSectionSize(fontMetrics().horizontalAdvance("-0000000.000") + Theme::Get().Scaled(10));
+  if (model()) FitColumns();
 }
 
 void ValueTable::FitColumns() {

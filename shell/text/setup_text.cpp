@@ -81,11 +81,6 @@ void SetupText::Restyle() {
   viewport()->update();
 }
 
-void SetupText::SetReadOnly(bool isReadOnly) {
-  isReadOnly_ = isReadOnly;
-  setReadOnly(isReadOnly_ || !IsWhole());
-}
-
 int SetupText::PercentThere() const { return static_cast<int>(100LL * whole_ / std::max(outline_.LineCount(), 1)); }
 
 // ---- The text
@@ -116,7 +111,7 @@ void SetupText::SetOutline(TextOutline outline) {
     FillOn();
   } else {
     // A last line without an end of its own is replaced with the end of the line in front of it.
-    Replace(first, oldCount, newCount > 0 ? outline_.Lines(first, first + newCount - 1) : std::string_view(), false);
+    Replace(first, oldCount, newCount > 0 ? outline_.Lines(first, first + newCount - 1) : std::string_view());
     whole_ = outline_.LineCount();
     const QTextBlock block = document()->findBlockByNumber(std::min(line, document()->blockCount() - 1));
     isOurs_ = true;
@@ -127,7 +122,7 @@ void SetupText::SetOutline(TextOutline outline) {
     lastLine_ = cursor.blockNumber();
     verticalScrollBar()->setValue(scrolled);
   }
-  setReadOnly(isReadOnly_ || !IsWhole());
+  setReadOnly(!IsWhole());
 }
 
 void SetupText::Rebase(TextOutline outline) {
@@ -141,9 +136,9 @@ void SetupText::Rebase(TextOutline outline) {
   whole_ = outline_.LineCount();
 }
 
-void SetupText::Replace(int first, int count, std::string_view text, bool isUndoable) {
+void SetupText::Replace(int first, int count, std::string_view text) {
   isOurs_ = true;
-  if (!isUndoable) setUndoRedoEnabled(false);
+  setUndoRedoEnabled(false);
   QTextCursor cursor(document());
   const QTextBlock begin = document()->findBlockByNumber(first);
   const QTextBlock end = document()->findBlockByNumber(first + count);
@@ -156,7 +151,7 @@ void SetupText::Replace(int first, int count, std::string_view text, bool isUndo
     cursor.setPosition(end.position(), QTextCursor::KeepAnchor);
   }
   cursor.insertText(added);
-  if (!isUndoable) setUndoRedoEnabled(true);
+  setUndoRedoEnabled(true);
   isOurs_ = false;
   viewport()->update();
 }
@@ -172,7 +167,7 @@ void SetupText::FillOn() {
   whole_ = last + 1;
   setUndoRedoEnabled(true);
   isOurs_ = false;
-  setReadOnly(isReadOnly_ || !IsWhole());
+  setReadOnly(!IsWhole());
   if (!IsWhole()) filling_.start(0);
   if (wanted_ >= 0 && (wanted_ < whole_ || IsWhole())) {
     const int wanted = std::exchange(wanted_, -1);
@@ -442,11 +437,7 @@ bool SetupText::event(QEvent* event) {
 
 void SetupText::keyPressEvent(QKeyEvent* event) {
   if (event->matches(QKeySequence::Undo) || event->matches(QKeySequence::Redo)) return event->ignore();
-  if (event->key() == Qt::Key_Tab && event->modifiers() == Qt::NoModifier && !isReadOnly())
-    return insertPlainText("  ");
-  const bool folds =
-      event->modifiers() == Qt::ControlModifier && (event->key() == Qt::Key_Period || event->key() == Qt::Key_Minus);
-  if (folds && event->key() == Qt::Key_Period) {
+  if (event->modifiers() == Qt::ControlModifier && event->key() == Qt::Key_Period) {
     // The section around the cursor, or that of its own line.
     int line = textCursor().blockNumber();
     while (line > 0 && EndOfSection(line) < textCursor().blockNumber()) --line;

@@ -30,8 +30,6 @@ class SetupText : public QPlainTextEdit {
   bool IsWhole() const { return whole_ == outline_.LineCount(); }
   /// From 0 to 100.
   int PercentThere() const;
-  /// Nobody may edit, also when the text is whole.
-  void SetReadOnly(bool isReadOnly);
 
   bool IsEdited() const { return isEdited_; }
   /// The smallest section around all edited lines, with its texts; the section is `TextOutline::kNone` where they stand
@@ -81,7 +79,7 @@ class SetupText : public QPlainTextEdit {
   void Restyle();
   void FillOn();
   void OnContentsChange(int position, int removed, int added);
-  void Replace(int first, int count, std::string_view text, bool isUndoable);
+  void Replace(int first, int count, std::string_view text);
   QString TextOfLines(int first, int last) const;
   /// The line that ends the section that begins in a line; -1 where none begins.
   int EndOfSection(int line) const;
@@ -93,7 +91,6 @@ class SetupText : public QPlainTextEdit {
   int whole_ = 1;  ///< Lines of the given text that are there.
   int wanted_ = -1;
   bool isOurs_ = false;  ///< The text is changed by the program.
-  bool isReadOnly_ = false;
   bool isEdited_ = false;
   int keptTop_ = 0, keptTail_ = 0;  ///< Lines in front and at the end that were not edited.
   int lastLine_ = 0;

@@ -17,6 +17,7 @@
 #include "core/path.h"
 #include "forms/page_form.h"
 #include "platform/text.h"
+#include "shell/widgets/flat_button.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -26,16 +27,6 @@ namespace {
 
 constexpr int kCheckDelay = 350;  ///< Milliseconds after the last key until what is typed is looked at.
 constexpr int kMostProblemRows = 4;
-
-QToolButton* AddButton(QLayout& row, const QString& text, const QString& tip) {
-  auto* button = new QToolButton;
-  button->setText(text);
-  button->setToolTip(tip);
-  button->setAutoRaise(true);
-  button->setFocusPolicy(Qt::TabFocus);
-  row.addWidget(button);
-  return button;
-}
 
 }  // namespace
 
@@ -55,13 +46,12 @@ TextView::TextView(EditSession& session, QWidget* parent)
   findRow->addWidget(find_, 1);
   found_ = new QLabel;
   findRow->addWidget(found_);
-  connect(AddButton(*findRow, tr("Previous"), tr("Shift+Enter")), &QToolButton::clicked, this,
-          [this] { FindOn(true); });
-  connect(AddButton(*findRow, tr("Next"), tr("Enter")), &QToolButton::clicked, this, [this] { FindOn(false); });
-  connect(AddButton(*findRow, tr("Close"), tr("Esc")), &QToolButton::clicked, this, [this] {
+  AddFlatButton(*findRow, tr("Previous"), [this] { FindOn(true); })->setToolTip(tr("Shift+Enter"));
+  AddFlatButton(*findRow, tr("Next"), [this] { FindOn(false); })->setToolTip(tr("Enter"));
+  AddFlatButton(*findRow, tr("Close"), [this] {
     findBar_->hide();
     text_->setFocus();
-  });
+  })->setToolTip(tr("Esc"));
   findBar_->hide();
   column->addWidget(findBar_);
   column->addWidget(text_, 1);
@@ -72,7 +62,8 @@ TextView::TextView(EditSession& session, QWidget* parent)
   problems_->setAccessibleName(tr("Lines that the setup has not taken"));
   problems_->setHorizontalScrollBarPolicy(Qt::ScrollBarAsNeeded);
   problemRow->addWidget(problems_, 1);
-  drop_ = AddButton(*problemRow, tr("Show What Is &Held"), tr("Gives up the lines that the setup has not taken"));
+  drop_ = AddFlatButton(*problemRow, tr("Show What Is &Held"), [this] { Drop(); });
+  drop_->setToolTip(tr("Gives up the lines that the setup has not taken"));
   problemRow->setAlignment(drop_, Qt::AlignTop);
   problemBar_->hide();
   column->addWidget(problemBar_);
@@ -80,10 +71,8 @@ TextView::TextView(EditSession& session, QWidget* parent)
   status_->setTextFormat(Qt::PlainText);
   column->addWidget(status_);
 
-  text_->SetReadOnly(session_.IsReadOnly());
   connect(find_, &QLineEdit::textChanged, this, [this] { FindOn(false); });
   connect(find_, &QLineEdit::returnPressed, this, [this] { FindOn(false); });
-  connect(drop_, &QToolButton::clicked, this, &TextView::Drop);
   connect(problems_, &QListWidget::itemActivated, this, [this](const QListWidgetItem* item) {
     text_->GoToLine(item->data(Qt::UserRole).toInt());
     text_->setFocus();
@@ -247,6 +236,13 @@ void TextView::Drop() {
   text_->setFocus();
 }
 
+void TextView::Resume(const QString& typed) {
+  Follow();
+  text_->selectAll();
+  text_->insertPlainText(typed);
+  LookAtTyping();
+}
+
 void TextView::ShowProblems(std::vector<TextProblem> problems) {
   problems_->clear();
   for (const TextProblem& problem : problems) {
@@ -265,7 +261,6 @@ void TextView::ShowProblems(std::vector<TextProblem> problems) {
 void TextView::ShowStatus() {
   QStringList told;
   if (!text_->IsWhole()) told << tr("The text is coming: %1 %.").arg(text_->PercentThere());
-  if (session_.IsReadOnly()) told << tr("Read-only.");
   if (isStale_ && text_->IsEdited())
     told << tr("The setup has changed on a page since; the text shows that when it is taken.");
   const QTextCursor cursor = text_->textCursor();

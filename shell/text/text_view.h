@@ -48,6 +48,8 @@ class TextView : public QWidget {
   /// Takes typing back, or does it again, that the setup has not taken; false where there is none.
   bool UndoTyping();
   bool RedoTyping();
+  /// Goes on with a text that another view of the setup has had, with what the setup has not taken of it.
+  void Resume(const QString& typed);
   /// Gives up what the setup has not taken.
   void Drop();
   void StartFind();

@@ -179,12 +179,12 @@ class Monkey {
 
   void Note() {
     auto& view = *setup_.Frame().findChild<NotesView*>();
-    const std::vector<ReviewNote> notes = view.Notes();
+    const auto notes = view.Notes();
     if (notes.empty() || Any(2) == 0) {
       CYbSEKvfBase* node = FindNode(Document().Root(), ParseSetupPath(setup_.Frame().CurrentPath()).steps);
       return node ? view.Add(*node, "", "Anna", FromQt(Typed()) + "?") : void();
     }
-    const std::string& name = notes[Any(notes.size())].name;
+    const std::string& name = notes[Any(notes.size())].note.name;
     Any(2) == 0 ? view.Answer(name, "Bo", "yes") : view.Remove(name);
   }
 

@@ -125,8 +125,8 @@ TEST(ReviewNotes, AreATableForOtherPrograms) {
   note.answers.push_back({"Bo", "2026-11-28 09:00", "yes"});
   EXPECT_EQ(ReviewNotesAsCsv({note}),
             "Note,Place,State,Author,Date,Text\r\n"
-            "\"Review note 1\",\"Climate:SM\",\"open\",\"Anna\",\"2026-11-27 14:05\",\"say \"\"yes\"\"\"\r\n"
-            "\"Review note 1\",\"Climate:SM\",\"answer\",\"Bo\",\"2026-11-28 09:00\",\"yes\"\r\n");
+            "Review note 1,Climate:SM,open,Anna,2026-11-27 14:05,\"say \"\"yes\"\"\"\r\n"
+            "Review note 1,Climate:SM,answer,Bo,2026-11-28 09:00,yes\r\n");
 }
 
 }  // namespace

@@ -8,6 +8,7 @@
 #include <gmock/gmock.h>
 
 #include "shell/text/text_colors.h"
+#include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
 
 namespace tervane::text_view_test {
@@ -147,6 +148,26 @@ TEST(TextView, ANewSectionIsTypedLineByLineAndTakenWhenItIsWhole) {
   EXPECT_EQ(setup.Value("Species/Species_1:Name"), "Nitrate");
   EXPECT_TRUE(setup.Problems().isEmpty()) << FromQt(setup.Problems().join(", "));
   EXPECT_TRUE(setup.ShowsWhatIsHeld()) << "with all keys of the new section";
+}
+
+TEST(TextView, WhatIsNotTakenOutlivesOtherColoursAndIsAskedForBeforeItIsLost) {
+  ShownText setup;
+  setup.GoBehind("Title = \"old");
+  setup.Key(Qt::Key_Delete);
+  setup.Key(Qt::Key_Down);
+  setup.Frame().Redraw();
+  QApplication::processEvents();
+  EXPECT_TRUE(setup.Text().isVisible());
+  EXPECT_TRUE(setup.Shows("Title = \"old\n"));
+  EXPECT_EQ(setup.Problems().size(), 1);
+  {
+    test::NextAnswer no("No");
+    EXPECT_FALSE(setup.Window().CloseTab(&setup.Frame()));
+    EXPECT_THAT(no.Text(), HasSubstr("lines that the setup has not taken"));
+  }
+  EXPECT_TRUE(setup.Shows("Title = \"old\n"));
+  setup.View().Drop();
+  EXPECT_TRUE(setup.ShowsWhatIsHeld());
 }
 
 TEST(TextView, SectionsFoldAndOpenForAPlaceWithin) {
