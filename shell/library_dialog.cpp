@@ -24,8 +24,8 @@ namespace tervane {
 LibraryDialog::LibraryDialog(const Host::LibraryQuestion& question, Host& host, QWidget* parent)
     : QDialog(parent), question_(question), host_(host) {
   const Theme& theme = Theme::Get();
-  const QString entries = ToQt(std::string(question.kind.entryNames));
-  setWindowTitle(tr("Choose a %1").arg(ToQt(std::string(question.kind.entryName))));
+  const QString entries = Translated(std::string(question.kind.entryNames));
+  setWindowTitle(tr("Choose a %1").arg(Translated(std::string(question.kind.entryName))));
   resize(theme.Scaled(820), theme.Scaled(520));
   auto* all = new QVBoxLayout(this);
   auto* row = new QHBoxLayout;
@@ -112,7 +112,7 @@ void LibraryDialog::ShowEntry() {
   chart_->ShowWhenThere([this, row, isEntry] {
     if (isEntry) return ChartOf(reading_->library, reading_->library.entries[static_cast<std::size_t>(row)]);
     SeriesContent none;
-    none.message = FromQt(tr("No %1 is chosen.").arg(ToQt(std::string(question_.kind.entryName))));
+    none.message = FromQt(tr("No %1 is chosen.").arg(Translated(std::string(question_.kind.entryName))));
     return none;
   });
   std::string problem = reading_ ? reading_->problem : std::string();

@@ -69,7 +69,7 @@ QWidget* LibraryTab::BuildList() {
     connect(made, &QToolButton::clicked, this, [this, operation] { Act(operation); });
     return made;
   };
-  const QString entry = ToQt(std::string(editor_.Kind().entryName));
+  const QString entry = Translated(std::string(editor_.Kind().entryName));
   add_ = button(tr("Add"), tr("Add a %1 behind the chosen one").arg(entry), &LibraryEditor::Add);
   copy_ = button(tr("Copy"), tr("Add a copy of the chosen %1").arg(entry), &LibraryEditor::Duplicate);
   delete_ = button(tr("Delete"), tr("Delete the chosen %1").arg(entry), &LibraryEditor::Delete);
