@@ -32,7 +32,7 @@ set(TERVANE_HEADERS_setup_test ${TERVANE_HEADERS_test} "${PROJECT_SOURCE_DIR}/do
 set(TERVANE_HEADERS_desktop_test ${TERVANE_HEADERS_setup_test} <QApplication> <QWidget> <QtTest>
   "${PROJECT_SOURCE_DIR}/forms/plots.h")
 # The folders below the nodes.
-set(TERVANE_GROUND platform geometry data core)
+set(TERVANE_GROUND platform languages geometry data core)
 function(tervane_precompile target kind)
   get_property(first GLOBAL PROPERTY tervane_precompiled_${kind})
   if(first)

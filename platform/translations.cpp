@@ -3,14 +3,22 @@
 #include "platform/translations.h"
 
 #include <algorithm>
+#include <iterator>
 #include <utility>
 
 namespace tervane {
 
 namespace {
 
+/// Values in values in values, as a list in a text has them.
+constexpr int kDeepest = 50;
+
 bool IsPlaceholder(std::string_view text, std::size_t at) {
   return text[at] == '%' && at + 1 < text.size() && text[at + 1] >= '1' && text[at + 1] <= '9';
+}
+
+bool IsLetterByte(char c) {
+  return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || static_cast<unsigned char>(c) >= 0x80;
 }
 
 std::vector<char> PlaceholdersOf(std::string_view text) {
@@ -92,7 +100,24 @@ Translations::Translations(std::string_view catalogue) {
       *current += *plain;
   }
   if (problem_.empty()) take();
-  std::ranges::stable_sort(templates_, [](const Template& a, const Template& b) { return a.letters > b.letters; });
+  SortTemplates();
+}
+
+void Translations::SortTemplates() {
+  std::ranges::stable_sort(templates_, [](const Template& a, const Template& b) { return a.length > b.length; });
+  for (std::uint32_t i = 0; i < templates_.size(); ++i) {
+    const std::string &first = templates_[i].literals.front(), &last = templates_[i].literals.back();
+    if (!first.empty())
+      byFirst_[static_cast<unsigned char>(first.front())].push_back(i);
+    else
+      byLast_[last.empty() ? 0 : static_cast<unsigned char>(last.back())].push_back(i);
+  }
+}
+
+std::vector<std::string> Translations::Templates() const {
+  std::vector<std::string> texts;
+  for (const Template& each : templates_) texts.push_back(each.english);
+  return texts;
 }
 
 void Translations::Take(const std::string& context, const std::string& english, const std::string& translated,
@@ -108,14 +133,15 @@ void Translations::Take(const std::string& context, const std::string& english, 
   if (!exact_.emplace(english, translated).second) return Refuse(line, "this text has an entry already");
   texts_.push_back(english);
   if (!isTemplate) return;
-  Template made{{""}, translated};
+  Template made{english, {""}, translated};
   for (std::size_t i = 0; i < english.size(); ++i) {
     if (IsPlaceholder(english, i)) {
       ++i;
       made.literals.emplace_back();
     } else {
       made.literals.back() += english[i];
-      ++made.letters;
+      made.hasLetters = made.hasLetters || IsLetterByte(english[i]);
+      ++made.length;
     }
   }
   templates_.push_back(std::move(made));
@@ -130,21 +156,61 @@ std::optional<std::string> Translations::Exact(std::string_view english) const {
   return found == exact_.end() ? std::nullopt : std::optional(found->second);
 }
 
-std::optional<std::string> Translations::Finished(std::string_view english) const {
+std::optional<std::string> Translations::Finished(std::string_view english, int depth) const {
   if (auto found = Exact(english)) return found;
-  for (const Template& candidate : templates_) {
-    const auto values = ValuesIn(english, candidate.literals);
-    if (!values) continue;
-    std::string text;
-    for (std::size_t i = 0; i < candidate.translated.size(); ++i) {
-      if (IsPlaceholder(candidate.translated, i))
-        text += (*values)[static_cast<std::size_t>(candidate.translated[++i] - '1')];
-      else
-        text += candidate.translated[i];
-    }
-    return text;
+  if (english.empty() || depth > kDeepest) return {};
+  // The three lists as one, in the order of the templates.
+  const std::vector<std::uint32_t>* lists[] = {&byFirst_[static_cast<unsigned char>(english.front())],
+                                               &byLast_[static_cast<unsigned char>(english.back())], &byLast_[0]};
+  std::size_t next[std::size(lists)] = {};
+  for (;;) {
+    std::size_t list = std::size(lists);
+    for (std::size_t i = 0; i < std::size(lists); ++i)
+      if (next[i] < lists[i]->size() && (list == std::size(lists) || (*lists[i])[next[i]] < (*lists[list])[next[list]]))
+        list = i;
+    if (list == std::size(lists)) break;
+    if (auto found = ByTemplate(templates_[(*lists[list])[next[list]++]], english, depth)) return found;
   }
-  return {};
+  return ByLines(english, depth);
+}
+
+std::optional<std::string> Translations::ByTemplate(const Template& candidate, std::string_view english,
+                                                    int depth) const {
+  const auto values = ValuesIn(english, candidate.literals);
+  if (!values) return {};
+  bool isTold = candidate.hasLetters;
+  std::vector<std::string> told;
+  for (const std::string_view value : *values) {
+    auto found = Finished(value, depth + 1);
+    isTold = isTold || found;
+    told.push_back(found ? std::move(*found) : std::string(value));
+  }
+  if (!isTold) return {};
+  std::string text;
+  for (std::size_t i = 0; i < candidate.translated.size(); ++i) {
+    if (IsPlaceholder(candidate.translated, i))
+      text += told[static_cast<std::size_t>(candidate.translated[++i] - '1')];
+    else
+      text += candidate.translated[i];
+  }
+  return text;
+}
+
+std::optional<std::string> Translations::ByLines(std::string_view english, int depth) const {
+  if (english.find('\n') == std::string_view::npos) return {};
+  std::string text;
+  bool isTold = false;
+  for (;;) {
+    const std::size_t end = english.find('\n');
+    const std::string_view line = english.substr(0, end);
+    const auto found = Finished(line, depth + 1);
+    isTold = isTold || found;
+    text += found ? std::string_view(*found) : line;
+    if (end == std::string_view::npos) break;
+    text += '\n';
+    english.remove_prefix(end + 1);
+  }
+  return isTold ? std::optional(std::move(text)) : std::nullopt;
 }
 
 }  // namespace tervane

@@ -86,7 +86,7 @@ void CompareView::Take() {
   CYbSEKvfBase* node = key.isEmpty() ? TakeItem(session_.Document(), *other_, *chosen, problem)
                                      : TakeValue(session_.Document(), *other_, *chosen, problem);
   if (!node) {
-    told_->setText(tr("Not taken: %1.").arg(ToQt(problem)));
+    told_->setText(tr("Not taken: %1.").arg(Translated(problem)));
     return;
   }
   node->SetRevalidateAll();

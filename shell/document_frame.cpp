@@ -88,7 +88,7 @@ DocumentFrame::DocumentFrame(std::unique_ptr<EditSession> session, const QString
   Refresh(kDataChanged);
   if (trees_.front()->topLevelItemCount() > 0) trees_.front()->setCurrentItem(trees_.front()->topLevelItem(0));
   if (session_->IsReadOnly())
-    ShowBanner(tr("Read-only: %1.").arg(ToQt(session_->ReadOnlyReason())),
+    ShowBanner(tr("Read-only: %1.").arg(Translated(session_->ReadOnlyReason())),
                {{tr("Save &As…"), [this] { emit SaveAsWanted(); }}});
   ShowLoadReport();
   run_->FindRun();
@@ -450,12 +450,12 @@ void DocumentFrame::Change(CYbSEKvfBase& node, int hint, const QString& action) 
 bool DocumentFrame::Save(const std::string& path) {
   Commit();
   if (!session_->SaveAs(path)) {
-    Log(tr("Not saved: %1").arg(ToQt(session_->Error())));
+    Log(tr("Not saved: %1").arg(Translated(session_->Error())));
     host_.ShowMessage(session_->Error(), Host::Icon::Error);
     return false;
   }
   Log(tr("Saved as %1").arg(ToQt(path)));
-  for (const std::string& note : session_->Document().SaveNotes()) Log(ToQt(note));
+  for (const std::string& note : session_->Document().SaveNotes()) Log(Translated(note));
   if (diskBanner_) diskBanner_->deleteLater();
   program_.AddRecentFile(ToQt(path));
   Refresh(kDataChanged);

@@ -45,7 +45,7 @@ std::vector<QString> LeftInWords(const FixPlan& plan, CYbSEDocument& document) {
   std::vector<QString> lines;
   PlaceNames names(document);
   for (const LeftFinding& left : plan.left)
-    lines.push_back(ToQt(names.Of(*left.node, PathOf(*left.node), left.key)) + ": " + ToQt(left.why));
+    lines.push_back(Translated(names.Of(*left.node, PathOf(*left.node), left.key)) + ": " + Translated(left.why));
   return lines;
 }
 

@@ -88,8 +88,8 @@ void DocumentFrame::ShowJournal() {
   const std::string trouble = session_->TakeJournalTrouble();
   if (trouble.empty()) return;
   const QString text = tr("The journal is not kept: %1. What is not in it is written when that is possible again.");
-  Log(text.arg(ToQt(trouble)));
-  ShowBanner(text.arg(ToQt(trouble)), {});
+  Log(text.arg(Translated(trouble)));
+  ShowBanner(text.arg(Translated(trouble)), {});
 }
 
 }  // namespace tervane

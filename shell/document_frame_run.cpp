@@ -88,9 +88,10 @@ std::optional<DocumentFrame::ToldError> DocumentFrame::FirstError() const {
   if (first == messages.end()) return std::nullopt;
   const auto others = std::ranges::count_if(messages, &EngineMessage::isError) - 1;
   SetupFinding finding = FindingOf(session_->Document(), *first);
-  QString text = ToQt(finding.text);
+  QString text = Translated(finding.text);
   if (CYbSEKvfBase* node = NodeOf(finding.serial))
-    text = QString("%1: %2").arg(ToQt(PlaceNames(session_->Document()).Of(*node, finding.path, finding.key)), text);
+    text =
+        QString("%1: %2").arg(Translated(PlaceNames(session_->Document()).Of(*node, finding.path, finding.key)), text);
   if (others > 0) text += tr(" (and %1 more)").arg(others);
   return ToldError{std::move(finding), text};
 }
@@ -152,7 +153,7 @@ void DocumentFrame::CheckProcessedData() {
 void DocumentFrame::ShowProcessedDataNews() {
   const CPreprocessedDataManager* report = session_->Document().AttachPreprocessorReport();
   const std::string problem = report ? report->Problem() : std::string();
-  if (problem != toldProblem_ && !problem.empty()) Log(tr("Processed data: %1").arg(ToQt(problem)));
+  if (problem != toldProblem_ && !problem.empty()) Log(tr("Processed data: %1").arg(Translated(problem)));
   toldProblem_ = problem;
 }
 

@@ -28,17 +28,7 @@ QString PathText(const SetupFinding& finding) {
 
 QString FindingText(const SetupFinding& finding) {
   const QString text = Translated(finding.text).simplified();
-  return finding.detail.empty() ? text : text + " — " + ToQt(finding.detail);
-}
-
-/// A place in the user's language: titles, then the name of a control, whose label may end in a colon.
-QString TranslatedPlace(const QString& place) {
-  QStringList steps = place.split(" > ");
-  for (QString& step : steps) {
-    const QString title = Translated(FromQt(step)), label = Translated(FromQt(step + ":"));
-    step = title != step ? title : label.chopped(1);
-  }
-  return steps.join(" > ");
+  return finding.detail.empty() ? text : text + " — " + Translated(finding.detail);
 }
 
 void CollectNodes(CYbSEKvfBase& node, std::unordered_map<std::uint64_t, CYbSEKvfBase*>& wanted) {
@@ -101,7 +91,7 @@ QTreeWidgetItem* FindingsView::NewLine(const SetupFinding& finding, const QStrin
   const bool isWarning = finding.kind == SetupFinding::Kind::Warning;
   item->setIcon(kKindColumn, Theme::Get().Icon(isError ? "error" : isWarning ? "warning" : "note"));
   item->setText(kKindColumn, TextOfKind(finding.kind));
-  item->setText(kPlaceColumn, place.isEmpty() ? PathText(finding) : TranslatedPlace(place));
+  item->setText(kPlaceColumn, place.isEmpty() ? PathText(finding) : Translated(FromQt(place)));
   item->setText(kTextColumn, text);
   item->setToolTip(kTextColumn, text);
   item->setToolTip(kPlaceColumn, PathText(finding));
@@ -233,7 +223,7 @@ void FindingsView::FillMenu(QMenu& menu, QTreeWidgetItem* item) {
   constexpr std::size_t kFew = 6;
   QMenu& offered = mends.size() > kFew ? *menu.addMenu(tr("&Mend")) : menu;
   for (const Mend& mend : mends)
-    offered.addAction(ToQt(mend.text).replace("&", "&&"), this,
+    offered.addAction(Translated(mend.text).replace("&", "&&"), this,
                       [this, serial = finding->serial, mend] { emit MendChosen(serial, mend); });
 }
 

@@ -62,7 +62,7 @@ void ItemDialog::Sync() {
   const bool isRow = row >= 0 && row < static_cast<int>(question_.rows.size());
   const std::string refusal = isRow ? question_.rows[static_cast<std::size_t>(row)].refusal : std::string();
   ok_->setEnabled(isRow && refusal.empty());
-  refusal_->setText(refusal.empty() ? QString() : tr("It cannot be chosen: %1.").arg(ToQt(refusal)));
+  refusal_->setText(refusal.empty() ? QString() : tr("It cannot be chosen: %1.").arg(Translated(refusal)));
 }
 
 }  // namespace tervane

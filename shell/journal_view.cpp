@@ -171,7 +171,7 @@ void JournalView::Fill() {
   PlaceNames names(session_.Document());
   const auto placeOf = [&](const std::string& path, const std::string& key) {
     CYbSEKvfBase* node = FindNode(root, ParseSetupPath(path).steps);
-    return node ? ToQt(names.Of(*node, path, key)) : ToQt(key.empty() ? path : path + ":" + key);
+    return node ? Translated(names.Of(*node, path, key)) : ToQt(key.empty() ? path : path + ":" + key);
   };
   const auto showChange = [&](QTreeWidgetItem& item, const JournalChange& change) {
     item.setText(kJournalPlace, placeOf(change.path, change.key));
@@ -209,7 +209,7 @@ void JournalView::Fill() {
     items << item;
   }
   list_->addTopLevelItems(items);
-  QString told = !journal_.error.empty()       ? ToQt(journal_.error)
+  QString told = !journal_.error.empty()       ? Translated(journal_.error)
                  : journal_.steps.empty()      ? tr("No step was written yet.")
                  : matching > kMostJournalRows ? tr("The latest %1 of %2 steps").arg(kMostJournalRows).arg(matching)
                  : wanted.empty()              ? tr("%1 steps").arg(matching)
@@ -217,7 +217,7 @@ void JournalView::Fill() {
   if (!journal_.problems.empty()) told += tr(", lines that are no steps: %1").arg(journal_.problems.size());
   told_->setText(told);
   QStringList problems;
-  for (const std::string& problem : journal_.problems) problems << ToQt(problem);
+  for (const std::string& problem : journal_.problems) problems << Translated(problem);
   told_->setToolTip(problems.mid(0, 10).join("\n"));
   SyncButtons();
 }
@@ -251,7 +251,7 @@ void JournalView::TakeBack() {
   // The list is made anew by what changes.
   const JournalStep step = *chosen;
   if (const std::string problem = session_.TakeBack(step); !problem.empty())
-    host_.ShowMessage(FromQt(tr("The step cannot be taken back on its own: %1.").arg(ToQt(problem))),
+    host_.ShowMessage(FromQt(tr("The step cannot be taken back on its own: %1.").arg(Translated(problem))),
                       Host::Icon::Warning);
 }
 

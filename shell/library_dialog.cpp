@@ -117,7 +117,7 @@ void LibraryDialog::ShowEntry() {
   });
   std::string problem = reading_ ? reading_->problem : std::string();
   if (isEntry) problem = WhyNoEntry(question_.file, reading_->library, Chosen().entry);
-  problem_->setText(ToQt(problem));
+  problem_->setText(Translated(problem));
   problem_->setVisible(!problem.empty());
   ok_->setEnabled(isEntry && problem.empty() && !Chosen().entry.empty());
 }

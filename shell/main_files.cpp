@@ -133,7 +133,7 @@ bool MainWindow::EditDataFile(const QString& path) {
   if (first && first->dimensions == 0) editor = std::make_unique<SeriesEditor>(file, host_);
   if (!editor || !editor->File().Problem().empty()) {
     if (!ShowDataFile(path)) return false;
-    if (editor) statusBar()->showMessage(ToQt(editor->File().Problem()), kWhyTold);
+    if (editor) statusBar()->showMessage(Translated(editor->File().Problem()), kWhyTold);
     return true;
   }
   AddEditor(std::move(editor));

@@ -90,7 +90,7 @@ void MergeView::Fill() {
                      .arg(merge_.result.takenFromThem)
                      .arg(conflicts.size());
   told += conflicts.empty() ? tr(".") : tr("; of each, one side is taken.");
-  if (!Problem().empty()) told = ToQt(Problem());
+  if (!Problem().empty()) told = Translated(Problem());
   if (merge_.comments > 0) told += " " + tr("Comments inside of the setups are not merged: %1.").arg(merge_.comments);
   summary_->setText(told);
   table_->setRowCount(static_cast<int>(conflicts.size()));
@@ -102,7 +102,7 @@ void MergeView::Fill() {
     const QString texts[] = {path, sides[0], sides[1], sides[2]};
     for (int column = kPlace; column <= kTheirs; ++column) {
       auto* item = new QTableWidgetItem(texts[column]);
-      item->setToolTip(column == kPlace ? ToQt(conflict.Sentence()) : texts[column]);
+      item->setToolTip(column == kPlace ? Translated(conflict.Sentence()) : texts[column]);
       table_->setItem(i, column, item);
     }
     auto* take = new QComboBox;

@@ -177,7 +177,7 @@ void NotesView::Fill() {
     const ReviewNote& note = placed.note;
     if (note.place.empty()) return tr("The whole setup");
     CYbSEKvfBase* node = placed.serial ? nodeOf_(placed.serial) : nullptr;
-    return node ? ToQt(names.Of(*node, PathOf(*node), ParseSetupPath(note.place).key.name))
+    return node ? Translated(names.Of(*node, PathOf(*node), ParseSetupPath(note.place).key.name))
                 : tr("%1 (gone)").arg(ToQt(note.place));
   };
   for (const PlacedNote& placed : notes_) {
@@ -251,8 +251,8 @@ void NotesView::Change(const ReviewNote& note, int hint, const QString& action) 
 
 void NotesView::AddAt(CYbSEKvfBase& node, const std::string& key) {
   const std::uint64_t serial = node.Serial();
-  const QString about =
-      node.GetParent() ? ToQt(PlaceNames(session_.Document()).Of(node, PathOf(node), key)) : tr("The whole setup");
+  const QString about = node.GetParent() ? Translated(PlaceNames(session_.Document()).Of(node, PathOf(node), key))
+                                         : tr("The whole setup");
   NoteDialog dialog(tr("Add Note"), about, program_, window());
   if (dialog.exec() != QDialog::Accepted) return;
   // What was asked for a while may be gone.

@@ -65,7 +65,7 @@ QWidget* RunComparisonView::BuildSetups(const RunComparison& comparison) {
   auto* list = new DifferenceList(tr("First run"), tr("Second run"));
   list->Show(comparison.differences);
   const auto count = comparison.differences.size();
-  return WithText(!comparison.setupProblem.empty() ? ToQt(comparison.setupProblem)
+  return WithText(!comparison.setupProblem.empty() ? Translated(comparison.setupProblem)
                   : count == 0                     ? tr("Both setups hold the same.")
                                                    : tr("Places that differ: %1").arg(count),
                   list);
@@ -100,7 +100,7 @@ QWidget* RunComparisonView::BuildPoints(const RunComparison& comparison) {
     }
   }
   table->resizeColumnsToContents();
-  QString text = ToQt(comparison.pointsProblem);
+  QString text = Translated(comparison.pointsProblem);
   if (!comparison.points.empty())
     text += (text.isEmpty() ? "" : "\n") +
             tr("From %1 to %2, which both runs simulate. ME is observed minus simulated; R2 is the efficiency of Nash "

@@ -104,13 +104,13 @@ void MoveAxis(QCPAxis& axis, double part) {
 
 QString AxisTitle(const std::optional<NumberAxis>& numbers) {
   if (!numbers) return {};
-  const QString title = ToQt(numbers->title);
+  const QString title = Translated(numbers->title);
   return numbers->unit.empty() ? title : QString("%1 [%2]").arg(title, ToQt(numbers->unit));
 }
 
 QString PlaceText(double place, const std::optional<NumberAxis>& numbers) {
   if (!numbers) return AsDate(place).toString("yyyy/MM/dd HH:mm");
-  const QString number = ToQt(numbers->title) + " " + ToQt(FormatNumber(place, "%.6g"));
+  const QString number = Translated(numbers->title) + " " + ToQt(FormatNumber(place, "%.6g"));
   return numbers->unit.empty() ? number : number + " " + ToQt(numbers->unit);
 }
 

@@ -84,7 +84,7 @@ void ChartMarkers::MakeName(const DateMarker& marker) {
   name->position->setTypeX(QCPItemPosition::ptPlotCoords);
   name->position->setTypeY(QCPItemPosition::ptAxisRectRatio);
   name->setClipAxisRect(charts_.front());
-  name->setText(ToQt(marker.name));
+  name->setText(Translated(marker.name));
   names_.push_back(name);
 }
 

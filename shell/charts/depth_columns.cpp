@@ -47,7 +47,7 @@ void DepthColumns::Show(DepthContent content, const DisplayUnits* units) {
   if (content == content_ && shown == units_) return;
   content_ = std::move(content);
   units_ = shown;
-  setAccessibleName(ToQt(Summary(content_)));
+  setAccessibleName(Translated(Summary(content_)));
   update();
 }
 
@@ -95,7 +95,7 @@ void DepthColumns::paintEvent(QPaintEvent* /*event*/) {
   painter.fillRect(rect(), palette().base());
   if (content_.columns.empty() || !(content_.Bottom() > 0) || !std::isfinite(content_.Bottom())) {
     painter.setPen(Theme::Get().QuietColor());
-    painter.drawText(rect(), Qt::AlignCenter | Qt::TextWordWrap, ToQt(content_.message));
+    painter.drawText(rect(), Qt::AlignCenter | Qt::TextWordWrap, Translated(content_.message));
     return;
   }
   PaintAxis(painter);
@@ -103,8 +103,9 @@ void DepthColumns::paintEvent(QPaintEvent* /*event*/) {
     const DepthColumn& column = content_.columns[i];
     const QRectF place = PlaceOf(i);
     painter.setPen(palette().text().color());
-    painter.drawText(QRectF(place.left(), 0, place.width(), place.top()), Qt::AlignCenter,
-                     fontMetrics().elidedText(ToQt(column.title), Qt::ElideRight, static_cast<int>(place.width())));
+    painter.drawText(
+        QRectF(place.left(), 0, place.width(), place.top()), Qt::AlignCenter,
+        fontMetrics().elidedText(Translated(column.title), Qt::ElideRight, static_cast<int>(place.width())));
     double top = 0;
     for (const DepthBlock& block : column.blocks) {
       if (block.bottom > top) PaintBlock(painter, place, top, block);
@@ -139,7 +140,7 @@ void DepthColumns::PaintAxis(QPainter& painter) const {
   painter.translate(fontMetrics().height(), frame.center().y());
   painter.rotate(-90);
   painter.drawText(QRectF(-frame.height() / 2, -fontMetrics().height(), frame.height(), 1.5 * fontMetrics().height()),
-                   Qt::AlignCenter, ToQt("Depth [" + unit.Text() + "]"));
+                   Qt::AlignCenter, Translated("Depth [" + unit.Text() + "]"));
   painter.restore();
 }
 

@@ -126,7 +126,7 @@ void SectionView::Build() {
     for (const SectionProfile::Lens& lens : profile_.lenses)
       lenses_.push_back(AddBand(lens.name, lens.top, lens.bottom));
     for (const SectionProfile::Curve& curve : profile_.curves)
-      curves_.push_back(AddLine(ToQt(curve.name), curve.heights));
+      curves_.push_back(AddLine(Translated(curve.name), curve.heights));
     ground_ = AddLine(tr("Ground"), profile_.ground);
     AddMarks();
     AddScreens();
@@ -433,7 +433,7 @@ QString SectionView::LayersAt(double distance) const {
       text +=
           "\n" + tr("%1 from %2 to %3").arg(ToQt(lens.name), HeightText(lens.top[*at]), HeightText(lens.bottom[*at]));
   for (const SectionProfile::Curve& curve : profile_.curves)
-    text += "\n" + tr("%1 %2").arg(ToQt(curve.name), HeightText(curve.heights[*at]));
+    text += "\n" + tr("%1 %2").arg(Translated(curve.name), HeightText(curve.heights[*at]));
   return text;
 }
 

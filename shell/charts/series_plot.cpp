@@ -34,7 +34,7 @@ namespace {
 constexpr int kLeastInSight = 4;  ///< Of charts below each other; a page scrolls where it has no room for so many.
 
 QString NameOf(const Series& series) {
-  QString name = ToQt(series.name);
+  QString name = Translated(series.name);
   if (!series.unit.empty()) name += " [" + ToQt(series.unit) + "]";
   return name;
 }
@@ -522,7 +522,8 @@ QString SeriesPlot::TextAt(double time) const {
         at = before - 1;
     }
     if (text.isEmpty()) text = PlaceText(at->key, content_.numbers);
-    text += "   " + ToQt(curve.series->name) + " " + (std::isnan(at->value) ? tr("no value") : ValueText(at->value));
+    text +=
+        "   " + Translated(curve.series->name) + " " + (std::isnan(at->value) ? tr("no value") : ValueText(at->value));
     if (!std::isnan(at->value) && !curve.series->unit.empty()) text += " " + ToQt(curve.series->unit);
   }
   if (const QString names = bars_ ? bars_->NamesAt(time) : QString(); !names.isEmpty()) text += "   " + names;

@@ -58,7 +58,8 @@ TimeBarPlottable::TimeBarPlottable(QCPAxis* keys, QCPAxis* values, const std::ve
     const TimeBar& bar = dated[i];
     const std::size_t color =
         bar.kind == TimeBar::Kind::Thing ? colors.emplace(bar.name, colors.size()).first->second : 0;
-    bars_.push_back({AxisCoordinate(bar.start), AxisCoordinate(bar.end), ToQt(bar.name), color, bar.kind, lanes[i]});
+    bars_.push_back(
+        {AxisCoordinate(bar.start), AxisCoordinate(bar.end), Translated(bar.name), color, bar.kind, lanes[i]});
     longest_ = std::max(longest_, bars_.back().end - bars_.back().start);
     lanes_ = std::max(lanes_, lanes[i] + 1);
   }

@@ -242,13 +242,13 @@ void DataViewer::Reload(bool always) {
   frames_->Forget();
   shownUnits_ = units_;
   whole_->setCurrentIndex(Problem().empty() ? 0 : 1);
-  problem_->setText(ToQt(Problem()));
+  problem_->setText(Translated(Problem()));
   if (Problem().empty()) {
     const QSignalBlocker blocker(items_);
     items_->clear();
     for (int number = 1; number <= static_cast<int>(file_.Items().size()); ++number) {
       const QString name = ToQt(file_.Items()[static_cast<std::size_t>(number - 1)].name);
-      auto* row = new QListWidgetItem(name + "\n" + ToQt(file_.ItemDetail(number)));
+      auto* row = new QListWidgetItem(name + "\n" + Translated(file_.ItemDetail(number)));
       row->setToolTip(name);
       items_->addItem(row);
     }
@@ -256,8 +256,8 @@ void DataViewer::Reload(bool always) {
     for (const int number : file_.Chosen()) items_->item(number - 1)->setSelected(true);
   }
   QStringList notes;
-  for (const std::string& note : setupNotes_) notes << ToQt(note);
-  for (const std::string& note : file_.Notes()) notes << ToQt(note);
+  for (const std::string& note : setupNotes_) notes << Translated(note);
+  for (const std::string& note : file_.Notes()) notes << Translated(note);
   ShowNotes(notes.join("\n"));
   ShowItem();
 }
@@ -307,7 +307,7 @@ void DataViewer::ShowItem() {
 }
 
 void DataViewer::ShowSlice() {
-  tableText_->setText(ToQt(file_.TableText()));
+  tableText_->setText(Translated(file_.TableText()));
   tableText_->setVisible(!tableText_->text().isEmpty());
   if (file_.IsSeries()) return;
   player_->SetStep(static_cast<int>(file_.Slice().step));
@@ -408,7 +408,7 @@ QImage DataViewer::AnimationPicture(std::size_t step, std::string& problem) {
   painter.setFont(font());
   painter.setPen(palette().color(QPalette::Text));
   QString text = ToQt(file_.Item().name) + "   " + ToQt(file_.StepText(step));
-  if (result_.IsDifference()) text += "   " + ToQt(result_.DifferenceText());
+  if (result_.IsDifference()) text += "   " + Translated(result_.DifferenceText());
   painter.drawText(QRect(metrics.height(), 0, map.width(), head), Qt::AlignVCenter, text);
   return picture;
 }
@@ -461,7 +461,7 @@ void DataViewer::GoToDate() {
   bool isMoved = false;
   const std::size_t row = file_.ShowRowOf(step, isMoved);
   if (isMoved) table_->Reset();
-  tableText_->setText(ToQt(file_.TableText()));
+  tableText_->setText(Translated(file_.TableText()));
   table_->GoTo(static_cast<int>(row), static_cast<int>(file_.ColumnOf(file_.Chosen().front())));
 }
 

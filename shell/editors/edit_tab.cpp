@@ -53,8 +53,8 @@ void EditTab::HoldFile() {
 void EditTab::ShowReadOnly() {
   if (readOnlyBanner_) delete readOnlyBanner_;
   if (File().WhyReadOnly().empty()) return;
-  readOnlyBanner_ =
-      new Banner(tr("Read-only: %1. Changes can be saved under another name.").arg(ToQt(File().WhyReadOnly())), {});
+  readOnlyBanner_ = new Banner(
+      tr("Read-only: %1. Changes can be saved under another name.").arg(Translated(File().WhyReadOnly())), {});
   all_->addWidget(readOnlyBanner_);
 }
 

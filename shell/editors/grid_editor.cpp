@@ -79,7 +79,7 @@ GridEditor::GridEditor(const std::string& path, Host& host) : EditTab(host), edi
   if (!edit_.Problem().empty()) return;
   FillItems();
   Sync();
-  for (const std::string& note : edit_.Notes()) panel_->Tell(panel_->Told() + ToQt(note) + "\n");
+  for (const std::string& note : edit_.Notes()) panel_->Tell(panel_->Told() + Translated(note) + "\n");
 }
 
 GridEditor::~GridEditor() {
@@ -156,7 +156,7 @@ void GridEditor::ShowItem() {
   unit_->setText(edit_.IsCodes() ? tr("code") : ToQt(ShortUnitOf(item)));
   unit_->setVisible(!unit_->text().isEmpty());
   if (!edit_.WhyNotChanged().empty())
-    panel_->Tell(tr("This item cannot be changed: %1.").arg(ToQt(edit_.WhyNotChanged())));
+    panel_->Tell(tr("This item cannot be changed: %1.").arg(Translated(edit_.WhyNotChanged())));
   ShowSlice();
 }
 
@@ -342,7 +342,7 @@ void GridEditor::ShowStatistics() {
 }
 
 void GridEditor::Tell(const std::string& why) {
-  if (!why.empty()) panel_->Tell(ToQt(why));
+  if (!why.empty()) panel_->Tell(Translated(why));
 }
 
 QString GridEditor::CellText(float value) const {
@@ -353,7 +353,8 @@ std::optional<float> GridEditor::ValueIn(const QLineEdit& field) {
   const QString text = field.text().trimmed();
   if (text.isEmpty()) return kDeleteValue;
   const auto number = ParseCsvNumber(FromQt(text), true);
-  const QString why = number ? ToQt(edit_.WhyNotValue(*number)) : tr("A number was expected, or nothing for no value.");
+  const QString why =
+      number ? Translated(edit_.WhyNotValue(*number)) : tr("A number was expected, or nothing for no value.");
   if (why.isEmpty()) return static_cast<float>(*number);
   panel_->Tell(field.accessibleName() + " " + why);
   return std::nullopt;
@@ -367,7 +368,7 @@ QString GridEditor::Burn() {
   const auto path = Outside().AskFileToOpen({"Burn Shapes", "Shape file (*.shp)|*.shp||", "shp", {}});
   if (!path) return {};
   const auto facts = ShapeFactsOf(*path);
-  if (!facts->error.empty()) return ToQt(facts->error);
+  if (!facts->error.empty()) return Translated(facts->error);
   Host::ItemQuestion question{"Value of the Shapes", *path, {"Attribute"}, {{{"The value of the tools"}, {}}}, 0};
   for (const ShapeField& field : facts->fields) question.rows.push_back({{field.name}, {}});
   const auto row = facts->fields.empty() ? std::optional(0) : Outside().AskItem(question);
@@ -381,7 +382,7 @@ QString GridEditor::Burn() {
   WaitForPicture();
   std::string note;
   const std::string why = edit_.Burn(shapes, note);
-  return ToQt(why.empty() ? note : why);
+  return Translated(why.empty() ? note : why);
 }
 
 // ---- Tools

@@ -140,12 +140,13 @@ EditTable* GridEditor::BuildTable() {
   content.mayEdit = [this](int) { return edit_.WhyNotChanged().empty(); };
   const auto put = [this](const char* name, std::vector<std::tuple<int, int, float>> cells) {
     WaitForPicture();
-    return ToQt(edit_.PutCells(name, cells));
+    return Translated(edit_.PutCells(name, cells));
   };
   content.enter = [this, rowOf, put](int row, int column, const QString& text) {
     const auto number = ParseCsvNumber(FromQt(text), true);
     if (!number && !text.isEmpty()) return tr("A number was expected, or nothing for no value.");
-    if (const std::string why = number ? edit_.WhyNotValue(*number) : std::string(); !why.empty()) return ToQt(why);
+    if (const std::string why = number ? edit_.WhyNotValue(*number) : std::string(); !why.empty())
+      return Translated(why);
     return put("Change Cell", {{column, rowOf(row), number ? static_cast<float>(*number) : kDeleteValue}});
   };
   content.paste = [this, rowOf, put](int row, int column, const QString& text) {
@@ -160,7 +161,7 @@ EditTable* GridEditor::BuildTable() {
         const auto number = ParseCsvNumber(cell, !reader.SeparatesByComma());
         if (!number && !cell.empty()) return tr("Line %1: %2 is no number.").arg(reader.Line()).arg(ToQt(cell));
         if (const std::string why = number ? edit_.WhyNotValue(*number) : std::string(); !why.empty())
-          return tr("Line %1: %2").arg(reader.Line()).arg(ToQt(why));
+          return tr("Line %1: %2").arg(reader.Line()).arg(Translated(why));
         const int i = column + static_cast<int>(k), j = rowOf(row);
         if (i >= edit_.Grid()->Geometry().nx || j < 0)
           ++beyond;

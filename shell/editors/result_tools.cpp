@@ -94,11 +94,11 @@ void ResultTools::Sync() {
   colors_->setEnabled(!view_.IsDifference() && file_.Item().itemType != quantity::kCode);
   flows_->clear();
   flows_->addItem(tr("None"));
-  for (const std::string& name : view_.Flows()) flows_->addItem(ToQt(name));
+  for (const std::string& name : view_.Flows()) flows_->addItem(Translated(name));
   flows_->setCurrentIndex(view_.ShownFlow() ? static_cast<int>(*view_.ShownFlow()) + 1 : 0);
   flows_->setVisible(flows_->count() > 1);
   flowLabel_->setVisible(flows_->count() > 1);
-  difference_->setText(view_.IsDifference() ? ToQt(view_.DifferenceText()) : tr("Difference"));
+  difference_->setText(view_.IsDifference() ? Translated(view_.DifferenceText()) : tr("Difference"));
   thisStep_->setEnabled(hasSteps);
   none_->setEnabled(view_.IsDifference());
   cells_->setVisible(hasSteps && file_.HasDates());

@@ -87,7 +87,7 @@ SeriesEditor::SeriesEditor(const std::string& path, Host& host) : EditTab(host),
   connect(table_->selectionModel(), &QItemSelectionModel::selectionChanged, this, [this] { ShowStatistics(); });
   chart_->Show(Chart());
   ShowStatistics();
-  for (const std::string& note : edit_.Notes()) panel_->Tell(panel_->Told() + ToQt(note) + "\n");
+  for (const std::string& note : edit_.Notes()) panel_->Tell(panel_->Told() + Translated(note) + "\n");
 }
 
 SeriesEditor::~SeriesEditor() = default;
@@ -122,7 +122,7 @@ EditTable* SeriesEditor::BuildTable() {
     if (column == 0) {
       CYbDateTime time = CYbDateTime::Parse(FromQt(text), "%Y-%m-%d %H:%M:%S");
       const std::string why = time.IsValid() ? std::string() : EnterValue(time, FromQt(text));
-      return ToQt(why.empty() ? edit_.SetTime(at(row), time) : why);
+      return Translated(why.empty() ? edit_.SetTime(at(row), time) : why);
     }
     const auto number = ParseCsvNumber(FromQt(text), true);
     if (!number && !text.isEmpty()) return tr("A number was expected, or nothing for no value.");
@@ -131,7 +131,7 @@ EditTable* SeriesEditor::BuildTable() {
   content.paste = [this, at](int row, int column, const QString& text) {
     std::string note;
     const std::string why = edit_.Paste(at(row), at(std::max(column - 1, 0)), FromQt(text), note);
-    return ToQt(why.empty() ? note : why);
+    return Translated(why.empty() ? note : why);
   };
   content.clear = [this, at](int top, int left, int bottom, int right) {
     std::vector<std::size_t> series;
@@ -153,18 +153,19 @@ EditPanel* SeriesEditor::BuildPanel() {
   auto* constant = panel->Field(tr("Constant:"), tr("For gaps that get a constant"), "0");
   constant->setEnabled(false);
   connect(fill, &QComboBox::currentIndexChanged, constant, [constant](int index) { constant->setEnabled(index == 1); });
-  panel->Button(
-      tr("Fill Gaps"), tr("Of the selected cells, or of the series that are shown"), [this, panel, fill, constant] {
-        const auto fills = static_cast<GapFill>(fill->currentIndex());
-        const auto number = fills == GapFill::Constant ? panel->NumberIn(*constant) : std::optional(0.0);
-        return number ? ToQt(edit_.FillGaps(Rows(), Chosen(), fills, static_cast<float>(*number))) : panel->Told();
-      });
+  panel->Button(tr("Fill Gaps"), tr("Of the selected cells, or of the series that are shown"),
+                [this, panel, fill, constant] {
+                  const auto fills = static_cast<GapFill>(fill->currentIndex());
+                  const auto number = fills == GapFill::Constant ? panel->NumberIn(*constant) : std::optional(0.0);
+                  return number ? Translated(edit_.FillGaps(Rows(), Chosen(), fills, static_cast<float>(*number)))
+                                : panel->Told();
+                });
   auto* factor = panel->Field(tr("Times:"), tr("Each value becomes value times this, plus that"), "1");
   auto* offset = panel->Field(tr("Plus:"), tr("Each value becomes value times that, plus this"), "0");
   panel->Button(tr("Scale"), tr("The selected cells, or the series that are shown"), [this, panel, factor, offset] {
     const auto times = panel->NumberIn(*factor);
     const auto plus = times ? panel->NumberIn(*offset) : std::nullopt;
-    return plus ? ToQt(edit_.Scale(Rows(), Chosen(), *times, *plus)) : panel->Told();
+    return plus ? Translated(edit_.Scale(Rows(), Chosen(), *times, *plus)) : panel->Told();
   });
 
   panel->Group(tr("Rows"));
@@ -189,7 +190,7 @@ EditPanel* SeriesEditor::BuildPanel() {
   panel->Button(tr("Cut to Period"), tr("Keeps the rows from one date to the other"), [this, from, to] {
     const CYbDateTime begin = DateIn(*from);
     const CYbDateTime end = begin.IsValid() ? DateIn(*to) : begin;
-    return end.IsValid() ? ToQt(edit_.Cut(begin, end)) : panel_->Told();
+    return end.IsValid() ? Translated(edit_.Cut(begin, end)) : panel_->Told();
   });
   auto* count = panel->Field(tr("Number:"), tr("Of the unit below; a negative one shifts back"), "1");
   auto* unit = panel->Choice(tr("Of:"), tr("The unit of the number"), units);
@@ -204,7 +205,7 @@ EditPanel* SeriesEditor::BuildPanel() {
   };
   panel->Button(tr("Shift"), tr("Moves all times"), [this, span] {
     const auto by = span();
-    return by ? ToQt(edit_.ShiftTimes(by->seconds, by->months)) : panel_->Told();
+    return by ? Translated(edit_.ShiftTimes(by->seconds, by->months)) : panel_->Told();
   });
   panel->Button(
       tr("Resample"),
@@ -213,7 +214,7 @@ EditPanel* SeriesEditor::BuildPanel() {
          "lines"),
       [this, span] {
         const auto step = span();
-        return step ? ToQt(edit_.ResampleTo({step->seconds, step->months})) : panel_->Told();
+        return step ? Translated(edit_.ResampleTo({step->seconds, step->months})) : panel_->Told();
       },
       false);
 
@@ -234,7 +235,7 @@ SeriesEditor::Span SeriesEditor::SpanOf(int unit, int count) {
 CYbDateTime SeriesEditor::DateIn(const QLineEdit& field) {
   CYbDateTime date;
   if (const std::string why = EnterValue(date, FromQt(field.text().trimmed())); !why.empty())
-    panel_->Tell(field.accessibleName() + " " + ToQt(why));
+    panel_->Tell(field.accessibleName() + " " + Translated(why));
   return date;
 }
 
@@ -246,7 +247,8 @@ void SeriesEditor::FillList() {
   QStringList texts, shown;
   for (std::size_t series = 0; series < edit_.SeriesCount(); ++series) {
     const DataItem& item = edit_.ItemOf(series);
-    texts << ToQt(item.name) + "\n" + ToQt(ShortUnitOf(item)) + ", " + ToQt(ValueTypeText(item.valueType));
+    texts << ToQt(item.name) + "\n" + ToQt(ShortUnitOf(item)) + ", " +
+                 Translated(std::string(ValueTypeText(item.valueType)));
   }
   for (int row = 0; row < list_->count(); ++row) shown << list_->item(row)->text();
   if (texts == shown) return;

@@ -53,7 +53,7 @@ void TextFileView::Show(const std::string& path) {
   if (path.empty()) {
     status_->setText(tr("The report names no file here."));
   } else if (const std::string problem = pieces_.Open(path); !problem.empty()) {
-    status_->setText(ToQt(problem));
+    status_->setText(Translated(problem));
   } else {
     ReadOn();
   }
@@ -67,7 +67,7 @@ void TextFileView::ReadOn() {
   end.insertText(ToQt(pieces_.Next(kPiece)).remove('\r'));
   const QLocale locale;
   if (!pieces_.Error().empty())
-    status_->setText(ToQt(pieces_.Error()));
+    status_->setText(Translated(pieces_.Error()));
   else if (pieces_.IsAtEnd() || pieces_.Place() >= pieces_.Size())
     status_->clear();
   else

@@ -64,7 +64,7 @@ std::vector<LegendBlock> MapCanvas::Legends() const {
     if (!(*layer)->picture || !(*layer)->grid.withLegend) continue;
     const CTvn2DOrthoRotatedGridData& grid = *(*layer)->grid.grid;
     LegendBlock legend = (*layer)->picture->Palette().Legend();
-    legend.title = ToQt(grid.ItemName());
+    legend.title = Translated(grid.ItemName());
     const ItemType* item = FindItemType(grid.ItemType());
     if (legend.title.isEmpty() && item && item->code != quantity::kUndefined)
       legend.title = Translated(std::string(item->name));

@@ -154,7 +154,7 @@ QString TitleWithUnit(QString title, const std::string& unit) {
 
 ValueColors::ValueColors(const ValueScale& scale, const std::vector<double>& values, const DisplayUnits* units)
     : names_(scale.names), unit_(scale.itemType, scale.unit, units) {
-  legend_.title = names_.empty() ? TitleWithUnit(ToQt(scale.title), unit_.Text()) : ToQt(scale.title);
+  legend_.title = names_.empty() ? TitleWithUnit(Translated(scale.title), unit_.Text()) : Translated(scale.title);
   if (names_.empty())
     MakeClasses(values);
   else

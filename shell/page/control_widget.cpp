@@ -265,7 +265,7 @@ void ControlWidget::SyncFindings() {
       if (finding.key != control_.key) continue;
       worst = std::min(worst, finding.severity);
       texts += (texts.isEmpty() ? "" : "\n") + Translated(finding.text);
-      if (!finding.detail.empty()) texts += "\n" + ToQt(finding.detail);
+      if (!finding.detail.empty()) texts += "\n" + Translated(finding.detail);
     }
   }
   mark_->setVisible(!texts.isEmpty() && control_.IsShown());

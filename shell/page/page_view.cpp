@@ -411,7 +411,7 @@ void PageView::SyncFindings() {
                          : finding.severity == Severity::Warning ? theme.WarningColor()
                                                                  : theme.QuietColor();
     QString text = Translated(finding.text).toHtmlEscaped().replace("\n", "<br>");
-    if (!finding.detail.empty()) text += " — " + ToQt(finding.detail).toHtmlEscaped();
+    if (!finding.detail.empty()) text += " — " + Translated(finding.detail).toHtmlEscaped();
     if (const QString fix = fixOf_ ? fixOf_(node, finding) : QString(); !fix.isEmpty()) {
       text += QString("&nbsp; <a href='%1'>%2</a>").arg(linked_.size()).arg(fix.toHtmlEscaped());
       linked_.emplace_back(node.Serial(), finding);

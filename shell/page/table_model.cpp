@@ -60,12 +60,19 @@ bool TableModel::IsGreyText(int row, int column) const {
   return Table().IsGrey(row, column) && !Table().Column(column)->IsButton() && control_.IsEnabled();
 }
 
+QString TableModel::ShownText(int row, int column) const {
+  const std::string text = Table().ShownCell(row, column);
+  const CellKind kind = Table().Kind(row, column);
+  const bool isTyped = kind != CellKind::Choice && kind != CellKind::Button && !Table().IsReadOnly(row, column);
+  return isTyped ? ToQt(text) : Translated(text);
+}
+
 QVariant TableModel::data(const QModelIndex& index, int role) const {
   const int row = index.row() + 1, column = index.column() + 1;
   switch (role) {
     case Qt::DisplayRole:
       if (Table().Kind(row, column) == CellKind::Check) return {};
-      return ToQt(Table().ShownCell(row, column));
+      return ShownText(row, column);
     case Qt::EditRole:
       return ToQt(Table().Cell(row, column));
     case Qt::CheckStateRole:
@@ -74,7 +81,7 @@ QVariant TableModel::data(const QModelIndex& index, int role) const {
       return {};
     case Qt::ToolTipRole:
       // What does not fit into its cell is read here.
-      return Table().IsShownOnly() ? ToQt(Table().ShownCell(row, column)) : Translated(Table().ToolTip(row, column));
+      return Table().IsShownOnly() ? ShownText(row, column) : Translated(Table().ToolTip(row, column));
     case Qt::AccessibleTextRole:
       if (Table().Kind(row, column) == CellKind::Check) return Translated(Table().Head(column));
       // A button may have no more than an icon.

@@ -37,6 +37,8 @@ class TableModel : public QAbstractTableModel {
   /// What tells that the columns are others, whatever the units of their numbers are.
   QStringList Columns() const;
   bool IsGreyText(int row, int column) const;
+  /// What nobody types is a text of ours as a rule, and stands in the user's language.
+  QString ShownText(int row, int column) const;
 
   CYbSEDlgBase& page_;
   Control& control_;

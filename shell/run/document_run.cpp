@@ -55,7 +55,7 @@ void DocumentRun::Start(const CYbSimpleLaunch& launch, bool showsProgress) {
                                                 EnginePlaces::Here(host_.Setting(kEnginePathSetting)), problem);
   if (request) PreparePassport(session_.Document(), *request);
   if (!request || !run.Start(*request, problem)) {
-    AddToLog(tr("Not run: %1").arg(ToQt(problem)));
+    AddToLog(tr("Not run: %1").arg(Translated(problem)));
     host_.ShowMessage(problem, Host::Icon::Error);
     return;
   }

@@ -46,7 +46,7 @@ void RunPanel::Sync() {
   // Nothing is known before the engine tells it: the bar then only moves.
   bar_->setRange(0, progress ? 100 : 0);
   if (progress) bar_->setValue(static_cast<int>(progress->percent));
-  const QString said = progress ? ToQt(progress->text) : QString();
+  const QString said = progress ? Translated(progress->text) : QString();
   text_->setText(run_.IsStopping() ? tr("Stopping…") : said.isEmpty() ? tr("Running %1").arg(run_.Name()) : said);
   text_->setToolTip(said);
   time_->setText(run_.Duration());

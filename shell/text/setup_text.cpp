@@ -429,7 +429,7 @@ bool SetupText::event(QEvent* event) {
     const auto* help = static_cast<QHelpEvent*>(event);
     const QPoint place = viewport()->mapFromGlobal(help->globalPos());
     const TextProblem* problem = ProblemAt(cursorForPosition(place).blockNumber());
-    QToolTip::showText(help->globalPos(), problem ? ToQt(problem->text) : QString(), this);
+    QToolTip::showText(help->globalPos(), problem ? Translated(problem->text) : QString(), this);
     return true;
   }
   return QPlainTextEdit::event(event);

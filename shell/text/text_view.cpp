@@ -246,7 +246,7 @@ void TextView::Resume(const QString& typed) {
 void TextView::ShowProblems(std::vector<TextProblem> problems) {
   problems_->clear();
   for (const TextProblem& problem : problems) {
-    auto* item = new QListWidgetItem(tr("Line %1: %2").arg(problem.line + 1).arg(ToQt(problem.text)), problems_);
+    auto* item = new QListWidgetItem(tr("Line %1: %2").arg(problem.line + 1).arg(Translated(problem.text)), problems_);
     item->setIcon(Theme::Get().Icon("error"));
     item->setData(Qt::UserRole, problem.line);
   }

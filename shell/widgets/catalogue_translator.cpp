@@ -2,16 +2,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "shell/widgets/catalogue_translator.h"
 
-#include <QFile>
-
+#include "languages/languages.h"
 #include "shell/widgets/qt_text.h"
 
 namespace tervane {
 
-CatalogueTranslator::CatalogueTranslator(const QString& language) {
-  QFile file(":/translations/" + language + ".po");
-  if (file.open(QIODevice::ReadOnly)) catalogue_ = Translations(file.readAll().toStdString());
-}
+CatalogueTranslator::CatalogueTranslator(const QString& language) : catalogue_(CatalogueOf(FromQt(language))) {}
 
 QString CatalogueTranslator::translate(const char* context, const char* text, const char* /*disambiguation*/,
                                        int /*n*/) const {

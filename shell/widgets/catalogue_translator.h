@@ -8,7 +8,7 @@
 
 namespace tervane {
 
-/// Gives the toolkit the texts of one of the catalogues that the desktop brings along.
+/// Gives the toolkit the texts of one of the languages of the programs.
 class CatalogueTranslator : public QTranslator {
  public:
   /// Nothing is translated of a language that has no catalogue, as "en".
@@ -20,7 +20,7 @@ class CatalogueTranslator : public QTranslator {
                     int n = -1) const override;
 
  private:
-  Translations catalogue_;
+  const Translations& catalogue_;
 };
 
 }  // namespace tervane

@@ -28,6 +28,25 @@ TEST(TranslationsTest, ValuesGoOverToTheTemplateWithTheMostLetters) {
   EXPECT_EQ(texts.Exact("Not yet"), std::nullopt);
 }
 
+TEST(TranslationsTest, ValuesThatAreTextsAndLinesAreTranslatedThemselves) {
+  const Translations texts(
+      "msgid \"Grid\"\nmsgstr \"Gitter\"\n\n"
+      "msgctxt \"Pages\"\nmsgid \"%1:\"\nmsgstr \"%1:\"\n\n"
+      "msgctxt \"Pages\"\nmsgid \"%1 not known, %2\"\nmsgstr \"%1 nicht bekannt, %2\"\n\n"
+      "msgctxt \"Pages\"\nmsgid \"%1 not known\"\nmsgstr \"%1 nicht bekannt\"\n\n"
+      "msgctxt \"Pages\"\nmsgid \"Thickness of %1\"\nmsgstr \"Dicke von %1\"\n");
+  EXPECT_EQ(texts.Finished("Grid:"), "Gitter:");
+  EXPECT_EQ(texts.Finished("Thickness of Grid"), "Dicke von Gitter");
+  EXPECT_EQ(texts.Finished("a not known, b not known, Grid not known"),
+            "a nicht bekannt, b nicht bekannt, Gitter nicht bekannt");
+  EXPECT_EQ(texts.Finished("Clay\nGrid\n"), "Clay\nGitter\n");
+  // Nothing is said of values alone.
+  EXPECT_EQ(texts.Finished("Clay:"), std::nullopt);
+  EXPECT_EQ(texts.Finished("Clay\nSand"), std::nullopt);
+  EXPECT_EQ(texts.Finished(""), std::nullopt);
+  EXPECT_EQ(texts.Templates().front(), "Thickness of %1");
+}
+
 TEST(TranslationsTest, FaultsAreToldWithTheirLine) {
   const struct {
     const char* catalogue;
