@@ -12,6 +12,7 @@
 #include "cli/offers.h"
 #include "cli/parts/json.h"
 #include "cli/parts/setup_file.h"
+#include "languages/languages.h"
 #include "pages/findings.h"
 #include "platform/text.h"
 
@@ -20,7 +21,7 @@ namespace tervane {
 namespace {
 
 struct CheckOptions {
-  std::string file;
+  std::string file, language = "en";
   bool json = false, coverage = false, each = false, fix = false;
   FixOptions fixes;
 };
@@ -88,29 +89,31 @@ void WriteJson(const CYbSEDocument& document, const std::vector<SetupFinding>& f
              JsonObject({{"fixed", fixed}, {"findings", JsonArray(found)}, {"unread", JsonArray(notRead)}}));
 }
 
-void WriteFinding(const std::string& file, const SetupFinding& finding, std::ostream& out) {
+void WriteFinding(const std::string& file, const SetupFinding& finding, const Translations& told, std::ostream& out) {
   const std::string line = finding.line > 0 ? fmt::format("{}:", finding.line) : std::string();
   const std::string key = finding.key.empty() ? std::string() : ":" + finding.key;
   const std::string place = OneLine(finding.path + key);
   // What belongs to no node, as a comment, has no place; a remark on the whole file keeps its colon.
   const bool hasPlace = !place.empty() || finding.kind != SetupFinding::Kind::Unread;
-  fmt::print(out, "{}:{} {}: {}{}{}{}\n", file, line, KindName(finding.kind), place, hasPlace ? ": " : "",
-             OneLine(finding.text),
-             finding.detail.empty() ? std::string() : fmt::format(" ({})", OneLine(finding.detail)));
+  fmt::print(out, "{}:{} {}: {}{}{}{}\n", file, line, InLanguage(told, std::string(KindName(finding.kind))), place,
+             hasPlace ? ": " : "", OneLine(InLanguage(told, finding.text)),
+             finding.detail.empty() ? std::string() : fmt::format(" ({})", OneLine(InLanguage(told, finding.detail))));
 }
 
-void WriteText(const std::string& file, const std::vector<SetupFinding>& findings, bool each, std::ostream& out) {
+void WriteText(const std::vector<SetupFinding>& findings, const CheckOptions& options, std::ostream& out) {
+  const std::string& file = options.file;
+  const Translations& told = CatalogueOf(options.language);
   // A few are better told one by one.
   constexpr std::size_t kFewest = 4;
   for (const FindingGroup& group : GroupFindings(findings)) {
-    if (!each && group.findings.size() >= kFewest) {
-      fmt::print(out, "{}: {}: {}: {}\n", file, KindName(group.First().kind), OneLine(group.Place()),
-                 OneLine(group.Text()));
+    if (!options.each && group.findings.size() >= kFewest) {
+      fmt::print(out, "{}: {}: {}: {}\n", file, InLanguage(told, std::string(KindName(group.First().kind))),
+                 OneLine(group.Place()), OneLine(InLanguage(told, group.Text())));
       continue;
     }
-    for (const SetupFinding& finding : group.findings) WriteFinding(file, finding, out);
+    for (const SetupFinding& finding : group.findings) WriteFinding(file, finding, told, out);
   }
-  if (findings.empty()) fmt::print(out, "{}: no findings\n", file);
+  if (findings.empty()) fmt::print(out, "{}: {}\n", file, InLanguage(told, "no findings"));
 }
 
 int CheckCommand(const CheckOptions& options, Streams streams) {
@@ -131,7 +134,7 @@ int CheckCommand(const CheckOptions& options, Streams streams) {
   if (options.json)
     WriteJson(document, findings, fixed, streams.out);
   else
-    WriteText(file, findings, options.each, streams.out);
+    WriteText(findings, options, streams.out);
   return std::ranges::any_of(findings, NeedsAttention) ? kFindings : kDone;
 }
 
@@ -148,6 +151,14 @@ void OfferCheckCommand(CommandOffers& offers) {
       });
   AddSetup(check, options->file);
   check.AddFlag("--json", options->json, "As JSON");
+  check.AddTaken(
+      "--language",
+      [options](const std::string& typed) {
+        if (!IsLanguage(typed)) return fmt::format("{} is none of the languages: {}", typed, LanguageCodes());
+        options->language = typed;
+        return std::string();
+      },
+      "The language of the findings, en or de; JSON is English");
   check.AddFlag("--each", options->each, "Each finding on a line, also where many have one cause");
   check.AddFlag("--fix", options->fix, "Mend what can be mended, tell each value that changes, and save the setup");
   check.Add("--only", options->fixes.only, "One kind of fix alone; see FIXES").Needs("--fix");

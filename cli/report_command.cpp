@@ -20,7 +20,7 @@ namespace tervane {
 namespace {
 
 struct ReportCommandOptions {
-  std::string setup, out, sections, dates = "iso";
+  std::string setup, out, sections, dates = "iso", language;
   bool force = false;
   ReportOptions report;
 };
@@ -38,6 +38,7 @@ int WritePdf(const ReportCommandOptions& options, Streams streams) {
       desktop, {AbsoluteFromHere(options.setup), "--report", AbsoluteFromHere(options.out)}, {}, log};
   for (const auto& [name, value] : {std::pair<const char*, const std::string&>{"--report-sections", options.sections},
                                     {"--report-dates", options.dates},
+                                    {"--language", options.language},
                                     {"--report-logo", options.report.logo}})
     if (!value.empty()) start.arguments.insert(start.arguments.end(), {name, value});
   os::ProgramTree program;
@@ -90,6 +91,13 @@ void OfferReportCommand(CommandOffers& offers) {
         return TakeReportDates(typed, options->report);
       },
       "How dates are written: iso (2000-01-31), en, de or fr");
+  report.AddTaken(
+      "--language",
+      [options](const std::string& typed) {
+        options->language = typed;
+        return TakeReportLanguage(typed, options->report);
+      },
+      "The language of its texts, en or de; names and what people wrote stay");
   report.AddFlag("--force", options->force, "Replaces a file of that name");
   static const std::string kFooter = ReportSectionsFooter();
   report.Footer(kFooter.c_str());

@@ -13,6 +13,9 @@ namespace {
 /// Values in values in values, as a list in a text has them.
 constexpr int kDeepest = 50;
 
+/// Below that, a template says little by itself.
+constexpr std::size_t kFewLetters = 4;
+
 bool IsPlaceholder(std::string_view text, std::size_t at) {
   return text[at] == '%' && at + 1 < text.size() && text[at + 1] >= '1' && text[at + 1] <= '9';
 }
@@ -140,7 +143,7 @@ void Translations::Take(const std::string& context, const std::string& english, 
       made.literals.emplace_back();
     } else {
       made.literals.back() += english[i];
-      made.hasLetters = made.hasLetters || IsLetterByte(english[i]);
+      if (IsLetterByte(english[i])) ++made.letters;
       ++made.length;
     }
   }
@@ -178,14 +181,16 @@ std::optional<std::string> Translations::ByTemplate(const Template& candidate, s
                                                     int depth) const {
   const auto values = ValuesIn(english, candidate.literals);
   if (!values) return {};
-  bool isTold = candidate.hasLetters;
+  std::size_t translated = 0, numbers = 0;
   std::vector<std::string> told;
   for (const std::string_view value : *values) {
     auto found = Finished(value, depth + 1);
-    isTold = isTold || found;
+    if (found) ++translated;
+    if (!found && !value.empty() && value.front() >= '0' && value.front() <= '9') ++numbers;
     told.push_back(found ? std::move(*found) : std::string(value));
   }
-  if (!isTold) return {};
+  if (candidate.letters == 0 && translated == 0) return {};
+  if (candidate.letters > 0 && candidate.letters < kFewLetters && translated + numbers < told.size()) return {};
   std::string text;
   for (std::size_t i = 0; i < candidate.translated.size(); ++i) {
     if (IsPlaceholder(candidate.translated, i))

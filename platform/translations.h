@@ -27,7 +27,8 @@ class Translations {
   /// The entry of a text as it stands in the sources; nothing when there is none.
   std::optional<std::string> Exact(std::string_view english) const;
   /// The same of a finished text of a page or finding: its own entry, that of the template with the most letters, or
-  /// each of its lines by itself. A template without a letter, as "%1:", holds where one of its values has a text.
+  /// each of its lines by itself. A template of few letters joins texts: without a letter, as "%1:", it holds where
+  /// one of its values has a text; with some, as "%1 to %2", where each has one or is a number or date.
   std::optional<std::string> Finished(std::string_view english) const { return Finished(english, 0); }
   /// The texts that have an entry, in the order of the catalogue.
   const std::vector<std::string>& Texts() const { return texts_; }
@@ -40,7 +41,7 @@ class Translations {
     std::vector<std::string> literals;  ///< What stands before, between and behind the values.
     std::string translated;
     std::size_t length = 0;  ///< Of the literals.
-    bool hasLetters = false;
+    std::size_t letters = 0;
   };
 
   void Take(const std::string& context, const std::string& english, const std::string& translated, int line);

@@ -4,10 +4,8 @@
 #include <QDeadlineTimer>
 #include <QDir>
 #include <QImage>
-#include <QLibraryInfo>
 #include <QTemporaryDir>
 #include <QTimer>
-#include <QTranslator>
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
@@ -20,6 +18,7 @@
 
 #include <CLI/CLI.hpp>
 
+#include "languages/languages.h"
 #include "platform/os.h"
 #include "platform/version.h"
 #include "shell/document_frame.h"
@@ -29,9 +28,9 @@
 #include "shell/relief/relief_canvas.h"
 #include "shell/relief/relief_window.h"
 #include "shell/report_pdf.h"
-#include "shell/widgets/catalogue_translator.h"
 #include "shell/widgets/plot_frame.h"
 #include "shell/widgets/qt_text.h"
+#include "shell/widgets/shown_language.h"
 #include "shell/widgets/theme.h"
 
 namespace {
@@ -41,7 +40,7 @@ using namespace tervane;
 struct Typed {
   std::vector<std::string> files;
   bool text = false;
-  std::string page, below, size, screenshot, appearance, dialog, relief, report, language = "en";
+  std::string page, below, size, screenshot, appearance, dialog, relief, report, language;
   ReportOptions reported;
   std::vector<std::string> answers;
   double zoom = 0;
@@ -155,6 +154,10 @@ int Run(const Typed& typed, QApplication& application) {
   const bool isPicture = !typed.screenshot.empty();
   QTemporaryDir pictureFolder;
   Program program(isPicture ? pictureFolder.filePath("settings.ini") : QString());
+  // A picture is English unless it is told otherwise.
+  const ShownLanguage language(LanguageToShow(!typed.language.empty() ? ToQt(typed.language)
+                                              : isPicture             ? "en"
+                                                                      : program.Language()));
   Theme theme;
   if (const int appearance = program.Settings().value("Appearance", 0).toInt(); appearance > 0 && appearance <= 2)
     theme.SetAppearance(static_cast<Theme::Appearance>(appearance));
@@ -231,8 +234,13 @@ int main(int argc, char** argv) {
         return ParseSize(text).isValid() ? std::string() : "a size as 1280x800 was expected";
       });
   commandLine.add_option("--appearance", typed.appearance, "light or dark")->check(CLI::IsMember({"light", "dark"}));
-  commandLine.add_option("--language", typed.language, "The language of menus, pages and findings: en or de")
-      ->check(CLI::IsMember({"en", "de"}));
+  commandLine
+      .add_option("--language", typed.language,
+                  "The language of menus, pages and findings: " + LanguageCodes() + ", or system for the system's")
+      ->check([](const std::string& text) {
+        return text == kSystemLanguage || IsLanguage(text) ? std::string()
+                                                           : LanguageCodes() + " or system was expected";
+      });
   commandLine.add_option("--screenshot", typed.screenshot, "Draw the window into this picture and end");
   commandLine.add_option("--dialog", typed.dialog, "Draw the dialog that this button of the page opens");
   commandLine
@@ -259,16 +267,10 @@ int main(int argc, char** argv) {
 
   // A report needs no display.
   if (!typed.report.empty() && !qEnvironmentVariableIsSet("QT_QPA_PLATFORM")) qputenv("QT_QPA_PLATFORM", "offscreen");
+  if (IsLanguage(typed.language)) typed.reported.language = typed.language;
   Application application(argc, argv);
   QApplication::setApplicationName("Quarzel");
   QApplication::setApplicationVersion(kProgramVersion);
-  // The toolkit has texts of its own, those of dialogs, where its translations are installed.
-  QTranslator ofToolkit;
-  if (typed.language != "en" &&
-      ofToolkit.load("qtbase_" + ToQt(typed.language), QLibraryInfo::path(QLibraryInfo::TranslationsPath)))
-    QApplication::installTranslator(&ofToolkit);
-  CatalogueTranslator translator(ToQt(typed.language));
-  QApplication::installTranslator(&translator);
   try {
     return typed.report.empty() ? Run(typed, application) : DrawReport(typed);
   } catch (const std::bad_alloc&) {

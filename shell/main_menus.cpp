@@ -23,6 +23,7 @@
 #include "document/view_settings.h"
 #include "execution/engine_search.h"
 #include "execution/execute_flags.h"
+#include "languages/languages.h"
 #include "pages/document/modflow6_command.h"
 #include "shell/compare_view.h"
 #include "shell/document_frame.h"
@@ -38,6 +39,7 @@
 #include "shell/template_tab.h"
 #include "shell/welcome_page.h"
 #include "shell/widgets/qt_text.h"
+#include "shell/widgets/shown_language.h"
 #include "shell/widgets/theme.h"
 #include "simspec/model_components.h"
 
@@ -274,6 +276,18 @@ void MainWindow::BuildViewMenu() {
   look(tr("As the &System"), Theme::Appearance::System);
   look(tr("&Light"), Theme::Appearance::Light);
   look(tr("&Dark"), Theme::Appearance::Dark);
+  QMenu* languages = view->addMenu(tr("Lan&guage"));
+  auto* shown = new QActionGroup(this);
+  const auto language = [&](const QString& text, const QString& code) {
+    Command& command = Add(languages, text, nullptr, {}, [this, code, name = QString(text).remove('&')] {
+      program_.ChooseLanguage(code);
+      Tell(tr("%1: shown from the next start of the program on.").arg(name));
+    });
+    command.checked = [this, code] { return program_.Language() == code; };
+    shown->addAction(command.action);
+  };
+  language(tr("As the &System"), kSystemLanguage);
+  for (const Language& each : Languages()) language("&" + ToQt(std::string(each.name)), ToQt(std::string(each.code)));
   standardBar_->addActions({back.action, forward.action});
 }
 

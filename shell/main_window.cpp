@@ -132,10 +132,7 @@ DocumentFrame* MainWindow::AddFrame(std::unique_ptr<EditSession> session) {
   connect(
       frame, &DocumentFrame::ReloadWanted, this, [this, frame] { ReloadDocument(frame); }, Qt::QueuedConnection);
   connect(frame, &DocumentFrame::ChangesWanted, this, [this, frame] { ShowChanges(*frame); });
-  connect(frame, &DocumentFrame::Told, this, [this](const QString& text) {
-    statusBar()->showMessage(text, kToldFor);
-    Announce(*statusBar(), text);
-  });
+  connect(frame, &DocumentFrame::Told, this, &MainWindow::Tell);
   tabs_->setCurrentIndex(tabs_->addTab(frame, frame->Title()));
   frame->FocusNextPane();
   SyncCommands();
@@ -165,6 +162,11 @@ bool MainWindow::Receive(const Message& message) {
       if (setup) AddBackdrop(setup->Session().Document().Root(), map);
     });
   return true;
+}
+
+void MainWindow::Tell(const QString& text) {
+  statusBar()->showMessage(text, kToldFor);
+  Announce(*statusBar(), text);
 }
 
 void MainWindow::NewDocument() { AddFrame(EditSession::New(program_.RecoveryFolder())); }

@@ -103,6 +103,9 @@ class MainWindow : public QMainWindow, public MessageReceiver {
     std::function<bool()> checked;
   };
 
+  /// Tells something in the status line for a while.
+  void Tell(const QString& text);
+
   // In main_menus.cpp.
   void BuildMenus();
   void BuildEditMenu();

@@ -6,6 +6,7 @@
 #include <QStandardPaths>
 
 #include "shell/widgets/qt_text.h"
+#include "shell/widgets/shown_language.h"
 
 namespace tervane {
 
@@ -16,6 +17,7 @@ constexpr const char* kRecentFiles = "RecentFiles";
 constexpr const char* kBranches = "Branches";
 constexpr qsizetype kMostSetups = 30;  ///< Of which the branches are kept.
 constexpr const char* kDisplayUnits = "DisplayUnits";
+constexpr const char* kLanguage = "Language";
 
 }  // namespace
 
@@ -34,6 +36,10 @@ void Program::ChooseUnit(int itemType, int unitKey) {
   units_.Choose(itemType, unitKey);
   settings_->setValue(kDisplayUnits, ToQt(units_.Text()));
 }
+
+QString Program::Language() const { return settings_->value(kLanguage, kSystemLanguage).toString(); }
+
+void Program::ChooseLanguage(const QString& language) { settings_->setValue(kLanguage, language); }
 
 QStringList Program::RecentFiles() const { return settings_->value(kRecentFiles).toStringList(); }
 

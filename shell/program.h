@@ -22,6 +22,10 @@ class Program {
   const DisplayUnits& Units() const { return units_; }
   void ChooseUnit(int itemType, int unitKey);
 
+  /// The language that the user chose, a code or `kSystemLanguage`; it is shown from the next start on.
+  QString Language() const;
+  void ChooseLanguage(const QString& language);
+
   /// Setups that were open, the latest first.
   QStringList RecentFiles() const;
   void AddRecentFile(const QString& path);

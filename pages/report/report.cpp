@@ -11,8 +11,10 @@
 
 #include "execution/run_passport.h"
 #include "forms/page.h"
+#include "languages/languages.h"
 #include "pages/findings.h"
 #include "pages/place_names.h"
+#include "pages/report/report_language.h"
 #include "pages/tree_entries.h"
 #include "platform/paths.h"
 #include "platform/suggestion.h"
@@ -77,6 +79,7 @@ Report MakeReport(CFlowModelDoc& document, const ReportOptions& options) {
     kind.make(context, section.blocks);
     if (!section.blocks.empty()) report.sections.push_back(std::move(section));
   }
+  TranslateReport(report, options.language);
   return report;
 }
 
@@ -103,6 +106,12 @@ std::string TakeReportDates(std::string_view typed, ReportOptions& options) {
                                     {"fr", Style::French}})
     if (typed == name) return options.dates.style = style, std::string();
   return fmt::format("{} is none of iso, en, de and fr", typed);
+}
+
+std::string TakeReportLanguage(std::string_view typed, ReportOptions& options) {
+  if (!IsLanguage(typed)) return fmt::format("{} is none of the languages: {}", typed, LanguageCodes());
+  options.language = typed;
+  return {};
 }
 
 std::string ReportSectionsFooter() {

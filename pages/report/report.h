@@ -44,6 +44,7 @@ struct ReportSection {
 struct Report {
   std::string title, file, made;  ///< Of the simulation; the setup's file; when and by what the report was made.
   std::string logo;               ///< The path of a picture; empty for none.
+  std::string language = "en";
   std::vector<ReportSection> sections;
 };
 
@@ -67,6 +68,7 @@ struct ReportOptions {
   std::vector<std::string> sections;  ///< Names; all where there are none.
   std::string logo;
   ReportDates dates;
+  std::string language = "en";
 };
 
 /// Makes the report of a setup as it is, its latest validation included. Sections without content are left out.
@@ -75,6 +77,7 @@ Report MakeReport(CFlowModelDoc& document, const ReportOptions& options);
 // What is typed, for the programs: why it is refused, or nothing.
 std::string TakeReportSections(std::string_view typed, ReportOptions& options);
 std::string TakeReportDates(std::string_view typed, ReportOptions& options);
+std::string TakeReportLanguage(std::string_view typed, ReportOptions& options);
 /// The sections with what they tell, for help.
 std::string ReportSectionsFooter();
 

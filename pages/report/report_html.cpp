@@ -114,11 +114,11 @@ FileResult WriteReportHtml(const std::string& path, const Report& report) {
   for (const ReportSection& section : report.sections)
     contents += fmt::format("<li><a href=\"#{}\">{}</a></li>\n", section.name, XmlText(section.title));
   const std::string head = fmt::format(
-      "<!DOCTYPE html>\n<html lang=\"en\">\n<head>\n<meta charset=\"utf-8\">\n<title>{0}</title>\n<style>{1}</style>\n"
+      "<!DOCTYPE html>\n<html lang=\"{6}\">\n<head>\n<meta charset=\"utf-8\">\n<title>{0}</title>\n<style>{1}</style>\n"
       "</head>\n<body>\n<header><div><h1>{0}</h1>\n<p class=\"quiet\">{2}\n{3}</p></div>{4}</header>\n"
       "<nav><ol>\n{5}</ol></nav>\n",
       XmlText(report.title), kStyle, XmlText(report.file), XmlText(report.made),
-      logo.empty() ? std::string() : fmt::format("<img alt=\"\" src=\"{}\">", logo), contents);
+      logo.empty() ? std::string() : fmt::format("<img alt=\"\" src=\"{}\">", logo), contents, report.language);
   return WriteFileAtomically(path, head + ReportBody(report, [](const ReportPicture& drawn, std::size_t) {
                                      return drawn.svg;
                                    }) + "</body>\n</html>\n");

@@ -15,11 +15,32 @@
 #include "surface/crop_course.h"
 #include "surface/vegetation.h"
 #include "tests/support/command_outcome.h"
+#include "tests/support/setup.h"
+#include "tests/support/temp_folder.h"
 
 namespace tervane::check_command_test {
 namespace {
 
 const std::string kFolder = TERVANE_SOURCE_DIR "/examples/rhone/";
+
+TEST(CheckCommand, SpeaksGermanButInJson) {
+  const std::string setup = kFolder + "rhone.tvd";
+  EXPECT_EQ(test::Tervane({"check", setup, "--language", "de"}).out,
+            setup +
+                ": Warnung: Climate/PrecipitationRate/TIME_SERIES_31:GRIDCODEID: Es bekommt keine Zelle des "
+                "Modells: sein Inhalt wird nirgends verwendet\n");
+  EXPECT_EQ(test::Tervane({"check", setup, "--language", "de", "--json"}).out,
+            test::Tervane({"check", setup, "--json"}).out);
+  const test::TempFolder folder;
+  const std::string several = folder.Write(
+      "several.tvd", test::SetupText(14,
+                                     "section SimSpec {\nsection SimulationPeriod {\nSIMEND = 1999, 1, 1, 0, 0\n}\n"
+                                     "NotAKey = 1\n}"));
+  const std::string told = test::Tervane({"check", several, "--language", "de"}).out;
+  EXPECT_THAT(told, testing::HasSubstr("Fehler: "));
+  EXPECT_THAT(told, testing::HasSubstr("nicht gelesen: SimSpec"));
+  EXPECT_THAT(told, testing::Not(testing::HasSubstr("error")));
+}
 
 TEST(CheckCommand, TheRhoneIsWhole) {
   CTvn2DOrthoRotatedGridData heights;

@@ -63,6 +63,16 @@ TEST_F(ReportCommand, NamesOfFilesAreNoDates) {
   EXPECT_THAT(page, AllOf(HasSubstr("dem of 2000-01-31.nds2"), HasSubstr("Since 31. Januar 2000")));
 }
 
+TEST_F(ReportCommand, SpeaksTheLanguageOfTheClient) {
+  const std::string page = Report({kRhone, "--language", "de", "--dates", "de"});
+  EXPECT_THAT(page, AllOf(HasSubstr("<html lang=\"de\">"), HasSubstr("Was simuliert wird</h2>"),
+                          HasSubstr("<th>Vorgabe</th>"), HasSubstr("1. Januar 2012 bis 31. Dezember 2015 (1460 Tage)"),
+                          HasSubstr("Es bekommt keine Zelle des Modells"), HasSubstr("Rhone at Porte du Scex")));
+  EXPECT_THAT(page, Not(HasSubstr("What is simulated")));
+  EXPECT_EQ(Tervane({"report", kRhone, "-o", folder.File("other.html"), "--language", "tlh"}).err,
+            "--language: tlh is none of the languages: en or de\nRun with --help for more information.\n");
+}
+
 TEST_F(ReportCommand, RefusesWhatItCannotWriteAndLeavesTheFile) {
   folder.Write("report.html", "mine");
   folder.Write("logo.bmp", "x");

@@ -33,6 +33,7 @@ TEST(TranslationsTest, ValuesThatAreTextsAndLinesAreTranslatedThemselves) {
       "msgid \"Grid\"\nmsgstr \"Gitter\"\n\n"
       "msgctxt \"Pages\"\nmsgid \"%1:\"\nmsgstr \"%1:\"\n\n"
       "msgctxt \"Pages\"\nmsgid \"%1 not known, %2\"\nmsgstr \"%1 nicht bekannt, %2\"\n\n"
+      "msgctxt \"Pages\"\nmsgid \"%1 to %2\"\nmsgstr \"%1 bis %2\"\n\n"
       "msgctxt \"Pages\"\nmsgid \"%1 not known\"\nmsgstr \"%1 nicht bekannt\"\n\n"
       "msgctxt \"Pages\"\nmsgid \"Thickness of %1\"\nmsgstr \"Dicke von %1\"\n");
   EXPECT_EQ(texts.Finished("Grid:"), "Gitter:");
@@ -40,6 +41,8 @@ TEST(TranslationsTest, ValuesThatAreTextsAndLinesAreTranslatedThemselves) {
   EXPECT_EQ(texts.Finished("a not known, b not known, Grid not known"),
             "a nicht bekannt, b nicht bekannt, Gitter nicht bekannt");
   EXPECT_EQ(texts.Finished("Clay\nGrid\n"), "Clay\nGitter\n");
+  EXPECT_EQ(texts.Finished("2000-01-01 to 2000-02-01"), "2000-01-01 bis 2000-02-01");
+  EXPECT_EQ(texts.Finished("flow to river"), std::nullopt);
   // Nothing is said of values alone.
   EXPECT_EQ(texts.Finished("Clay:"), std::nullopt);
   EXPECT_EQ(texts.Finished("Clay\nSand"), std::nullopt);
