@@ -3,6 +3,7 @@
 #include "access/accessed_setup.h"
 
 #include "core/open_kvf.h"
+#include "document/journal.h"
 #include "document/setup_lock.h"
 #include "platform/paths.h"
 
@@ -44,7 +45,9 @@ bool AccessedSetup::Save(const std::string& path) {
     if (isSame && StampOf(path) != stamp_)
       return Fail(path +
                   ": another program has changed it since it was read; open it again, or save under another name");
-    if (!document_->OnSaveDocument(path)) return Fail(document_->Error());
+    std::string trouble;
+    if (!SaveKeepingJournal(*document_, path, "Save by a Program", trouble)) return Fail(document_->Error());
+    if (!trouble.empty() && host_) host_->ShowMessage(trouble, Host::Icon::Warning);
     stamp_ = StampOf(path);
     return true;
   }

@@ -74,7 +74,7 @@ int ChangeClimate(CFlowModelDoc& document, const ClimateOptions& options, Stream
   if (const std::string problem = ApplyClimateScenario(document.Global(), options.scenario, folder, changes);
       !problem.empty())
     return Refuse(streams, problem);
-  if (!document.OnSaveDocument(out)) return Refuse(streams, document.Error());
+  if (!SaveSetup(document, out, "climate-change", streams)) return kCouldNot;
   for (const std::string& change : changes) fmt::print(streams.out, "{}\n", change);
   if (changes.empty()) fmt::print(streams.out, "the setup has nothing of what is to be changed\n");
   return kDone;

@@ -18,15 +18,6 @@ struct FileOptions {
   bool force = false;
 };
 
-int Save(CFlowModelDoc& document, const std::string& file, Streams streams) {
-  if (!document.OnSaveDocument(file)) {
-    fmt::print(streams.err, "{}\n", document.Error());
-    return kCouldNot;
-  }
-  for (const std::string& note : document.SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
-  return kDone;
-}
-
 int NewCommand(const std::string& file, bool force, Streams streams) {
   if (!force && !EqualIgnoringCase(ExtensionOf(file), ".tvd"))
     return Refuse(streams, fmt::format("{}: a setup is named NAME.tvd; add --force to write it all the same", file));
@@ -34,7 +25,7 @@ int NewCommand(const std::string& file, bool force, Streams streams) {
   SetupLock lock;
   if (!HoldSetup(lock, file, force, streams)) return kCouldNot;
   CFlowModelDoc document;
-  return Save(document, file, streams);
+  return SaveSetup(document, file, "new", streams) ? kDone : kCouldNot;
 }
 
 int ConvertCommand(const std::string& in, const std::string& out, bool force, Streams streams) {
@@ -46,7 +37,7 @@ int ConvertCommand(const std::string& in, const std::string& out, bool force, St
   CFlowModelDoc document;
   if (!OpenSetup(document, in, streams)) return kCouldNot;
   PrintLoadReport(document, streams);
-  return Save(document, out, streams);
+  return SaveSetup(document, out, "convert", streams) ? kDone : kCouldNot;
 }
 
 }  // namespace

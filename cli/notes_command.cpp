@@ -84,9 +84,7 @@ int ChangeNotes(const NotesOptions& options, Streams streams,
   PrintLoadReport(document, streams);
   if (const std::string problem = change(document, *document.Root().Child<CExtraParamsKvf>()); !problem.empty())
     return problem == kTold ? kCouldNot : Refuse(streams, problem);
-  if (!document.OnSaveDocument(options.file)) return Refuse(streams, document.Error());
-  for (const std::string& note : document.SaveNotes()) fmt::print(streams.err, "{}: {}\n", options.file, note);
-  return kDone;
+  return SaveSetup(document, options.file, "notes", streams) ? kDone : kCouldNot;
 }
 
 int AddNote(const NotesOptions& options, Streams streams) {

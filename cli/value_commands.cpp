@@ -83,8 +83,7 @@ int SetCommand(const std::string& file, const std::vector<TypedChange>& changes,
     document = ReadWithChange(*document, change, problem);
     if (!document) return Refuse(streams, problem);
   }
-  if (!document->OnSaveDocument(file)) return Refuse(streams, document->Error());
-  for (const std::string& note : document->SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
+  if (!SaveSetup(*document, file, "set", streams)) return kCouldNot;
   for (const TypedChange& change : changes) PrintFindings(*document, change, streams);
   return kDone;
 }

@@ -8,6 +8,7 @@
 #include <ctime>
 #include <filesystem>
 #include <fstream>
+#include <optional>
 #include <system_error>
 
 #include <fmt/chrono.h>
@@ -163,7 +164,8 @@ std::string AppendToJournal(const std::string& path, std::string_view lines) {
   if (size > 0 && !ignored) {
     std::ifstream last(native, std::ios::binary);
     last.seekg(-1, std::ios::end);
-    isCut = last.get() != '\n';
+    const int end = last.get();
+    isCut = last && end != '\n';
   }
   errno = 0;
   std::ofstream file(native, std::ios::binary | std::ios::app);
@@ -254,6 +256,20 @@ std::string JournalKeeper::TakeTrouble() {
   if (trouble_.empty() || trouble_ == told_) return {};
   told_ = trouble_;
   return trouble_;
+}
+
+bool SaveKeepingJournal(CFlowModelDoc& document, const std::string& path, const std::string& action,
+                        std::string& trouble) {
+  trouble.clear();
+  CFlowModelDoc before;
+  const bool keeps = FileExists(JournalBeside(path)) && before.OnOpenDocument(path);
+  std::optional<JournalKeeper> keeper;
+  if (keeps) keeper.emplace(before);
+  if (!document.OnSaveDocument(path)) return false;
+  if (!keeps) return true;
+  keeper->Take(document, action, {});
+  trouble = keeper->TakeTrouble();
+  return true;
 }
 
 }  // namespace tervane

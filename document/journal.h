@@ -63,6 +63,12 @@ std::string JournalCsv(const std::vector<JournalStep>& steps);
 /// node that has changed, to be told to the document.
 CYbSEKvfBase* TakeBackStep(CFlowModelDoc& document, const JournalStep& step, std::string& problem);
 
+/// Saves a setup that was changed without an editor. Where a journal stands beside the file that is replaced, what
+/// changes in that file becomes a step of it. False when it could not be saved, with the reason in the document;
+/// `trouble` tells why a journal could not be written, which hinders no save.
+bool SaveKeepingJournal(CFlowModelDoc& document, const std::string& path, const std::string& action,
+                        std::string& trouble);
+
 /// Writes the journal of a setup that is being edited, by comparing what it would write after each step.
 class JournalKeeper {
  public:

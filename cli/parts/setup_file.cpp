@@ -8,6 +8,7 @@
 #include <fmt/ostream.h>
 
 #include "access/setup_place.h"
+#include "document/journal.h"
 #include "platform/text.h"
 
 namespace tervane {
@@ -16,6 +17,17 @@ bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams
   if (document.OnOpenDocument(file)) return true;
   fmt::print(streams.err, "{}\n", document.Error());
   return false;
+}
+
+bool SaveSetup(CFlowModelDoc& document, const std::string& file, std::string_view command, Streams streams) {
+  std::string trouble;
+  if (!SaveKeepingJournal(document, file, fmt::format("tervane {}", command), trouble)) {
+    fmt::print(streams.err, "{}\n", document.Error());
+    return false;
+  }
+  for (const std::string& note : document.SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
+  if (!trouble.empty()) fmt::print(streams.err, "{}\n", trouble);
+  return true;
 }
 
 namespace {

@@ -14,6 +14,10 @@ namespace tervane {
 /// Opens a setup; tells on the error stream why that failed.
 bool OpenSetup(CFlowModelDoc& document, const std::string& file, Streams streams);
 
+/// Saves a setup that the command of that name has changed, with a step in the journal beside it where there is one;
+/// tells on the error stream why that failed, and what a user should know of it.
+bool SaveSetup(CFlowModelDoc& document, const std::string& file, std::string_view command, Streams streams);
+
 /// Takes the lock of a setup that is read, changed and written, so that no change of another program is lost; waits for
 /// other commands that do the same. False, with a message, when an editor that runs has the setup open: its next save
 /// would undo what is written here. With `force` it is then written all the same.

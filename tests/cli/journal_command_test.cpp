@@ -52,5 +52,24 @@ TEST(JournalCommand, WhereThereIsNoneItIsTold) {
   EXPECT_THAT(outcome.err, HasSubstr("there is no journal beside this setup"));
 }
 
+TEST(JournalCommand, CommandsThatChangeASetupWithAJournalAddTheirSteps) {
+  const test::TempFolder folder;
+  const std::string setup = folder.File("a.tvd");
+  ASSERT_EQ(Tervane({"new", setup}).status, kDone);
+  ASSERT_EQ(Tervane({"set", setup, "SimSpec/SimTitle:Title", "first"}).status, kDone);
+  EXPECT_FALSE(FileExists(JournalBeside(setup))) << "nobody has asked for one";
+  folder.Write("a.tvd.journal", "");
+  ASSERT_EQ(Tervane({"set", setup, "SimSpec/SimTitle:Title", "second"}).status, kDone);
+  ASSERT_EQ(Tervane({"notes", "add", setup, "", "why?", "--author", "ann"}).status, kDone);
+  const Journal journal = ReadJournal(JournalBeside(setup));
+  ASSERT_EQ(journal.steps.size(), 2U);
+  EXPECT_EQ(journal.steps[0].action, "tervane set");
+  ASSERT_EQ(journal.steps[0].changes.size(), 1U);
+  EXPECT_EQ(journal.steps[0].changes[0],
+            (JournalChange{SetupDifference::Kind::Changed, "SimSpec/SimTitle", "Title", "\"first\"", "\"second\""}));
+  EXPECT_EQ(journal.steps[1].action, "tervane notes");
+  EXPECT_FALSE(journal.steps[1].changes.empty());
+}
+
 }  // namespace
 }  // namespace tervane::journal_command_test
