@@ -61,7 +61,7 @@ std::size_t FixAndSaveTo(const std::string& file, const std::string& saved) {
   QuickFixes fixes(document);
   std::string error;
   std::size_t changed = 0;
-  for (const FixRound& round : FixAll(document, fixes, nullptr, document.Root().SetupFolder(), error))
+  for (const FixRound& round : FixAll(document, fixes, nullptr, document.Root().SetupFolder(), false, error))
     changed += round.plan.values.size();
   if (changed < kStations || !document.OnSaveDocument(saved)) fmt::print("only {} fixed: {}\n", changed, error);
   return changed;

@@ -10,6 +10,7 @@
 #include <fmt/ostream.h>
 
 #include "cli/parts/json.h"
+#include "cli/parts/setup_file.h"
 #include "document/key_reference.h"
 #include "fixes/quick_fixes.h"
 #include "platform/paths.h"
@@ -23,9 +24,11 @@ const char* const kFixesFooter =
     "folder,\n"
     "where only one file has that name. only-item: the only item or attribute of a file that will do. projection: "
     "that\n"
-    "of the shapes of the domain. period-of-data: the simulation within what all files cover. date-within-simulation:\n"
-    "a date of water quality or particle tracking within the simulation of flow. range: the nearest number that is\n"
-    "allowed. offer: what a finding offers, where it offers one value alone.";
+    "of the shapes of the domain. convert: a copy of a file that is in another system than the domain, in that of the\n"
+    "domain, beside the file. period-of-data: the simulation within what all files cover. date-within-simulation: a "
+    "date\n"
+    "of water quality or particle tracking within the simulation of flow. range: the nearest number that is allowed.\n"
+    "offer: what a finding offers, where it offers one value alone.";
 
 namespace {
 
@@ -105,15 +108,12 @@ bool FixAndSave(CFlowModelDoc& document, const std::string& file, const FixOptio
   }
   const std::string folder = AbsoluteFromHere(options.folder.empty() ? document.Root().SetupFolder() : options.folder);
   std::string problem;
-  const std::vector<FixRound> rounds = FixAll(document, fixes, only, folder, problem);
+  const std::vector<FixRound> rounds = FixAll(document, fixes, only, folder, options.isDry, problem);
   if (!problem.empty()) return refuse(problem);
   std::size_t changed = 0;
   for (const FixRound& round : rounds) changed += round.plan.values.size();
   const bool isSaved = changed > 0 && !options.isDry;
-  if (isSaved) {
-    if (!document.OnSaveDocument(file)) return refuse(document.Error());
-    for (const std::string& note : document.SaveNotes()) fmt::print(streams.err, "{}: {}\n", file, note);
-  }
+  if (isSaved && !SaveSetup(document, file, "check --fix", streams)) return false;
   if (json) {
     *json = JsonRounds(rounds, isSaved);
     return true;

@@ -6,12 +6,14 @@
 #pragma once
 
 #include <functional>
+#include <memory>
 #include <span>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "core/node.h"
+#include "platform/computation.h"
 
 namespace tervane {
 
@@ -29,6 +31,9 @@ struct FixedValue {
   std::string key, before, after;
   /// Why it could not be done; empty where it was.
   std::function<std::string()> apply;
+  /// What takes long, such as the making of a file, and asks no node: it is done first, in any thread. Null where there
+  /// is nothing. Values may share one.
+  std::shared_ptr<Computation> preparation = nullptr;
 };
 
 /// Findings that a kind of fix leaves as they are, and why.

@@ -6,6 +6,7 @@
 #include <unordered_map>
 #include <unordered_set>
 
+#include "fixes/converted_files.h"
 #include "platform/paths.h"
 #include "simspec/period_fixes.h"
 #include "spatial/data_use.h"
@@ -53,13 +54,9 @@ void AddMissedFiles(CYbSEKvfBase& root, std::vector<FoundAt>& found) {
 }  // namespace
 
 QuickFixes::QuickFixes(CFlowModelDoc& document)
-    : keys_(document), document_(document), kinds_{MovedFiles(keys_),
-                                                   kOnlyItem,
-                                                   kProjectionOfShapes,
-                                                   kPeriodOfData,
-                                                   kDateWithinSimulation,
-                                                   NumberInRange(keys_),
-                                                   OnlyOffer()} {}
+    : keys_(document), document_(document), kinds_{MovedFiles(keys_),     kOnlyItem,     kProjectionOfShapes,
+                                                   ConvertedFiles(keys_), kPeriodOfData, kDateWithinSimulation,
+                                                   NumberInRange(keys_),  OnlyOffer()} {}
 
 QuickFixes::~QuickFixes() = default;
 
@@ -109,6 +106,14 @@ std::shared_ptr<Computed<FilesByName>> QuickFixes::SearchFor(const std::vector<F
       });
 }
 
+std::vector<std::shared_ptr<Computation>> QuickFixes::PreparationsOf(const FixPlan& plan) {
+  std::vector<std::shared_ptr<Computation>> preparations;
+  for (const FixedValue& value : plan.values)
+    if (value.preparation && std::ranges::find(preparations, value.preparation) == preparations.end())
+      preparations.push_back(value.preparation);
+  return preparations;
+}
+
 void QuickFixes::Apply(FixPlan& plan) {
   std::erase_if(plan.values, [&](const FixedValue& value) {
     std::string why = value.apply();
@@ -119,7 +124,7 @@ void QuickFixes::Apply(FixPlan& plan) {
 }
 
 std::vector<FixRound> FixAll(CFlowModelDoc& document, QuickFixes& fixes, const FixKind* only, const std::string& folder,
-                             std::string& error) {
+                             bool isTrial, std::string& error) {
   std::vector<FixRound> rounds;
   for (const FixKind& kind : fixes.Kinds()) {
     if (only && only != &kind) continue;
@@ -135,6 +140,9 @@ std::vector<FixRound> FixAll(CFlowModelDoc& document, QuickFixes& fixes, const F
     }
     FixRound& round = rounds.emplace_back(FixRound{&kind, {}});
     kind.plan(found, context, round.plan);
+    const auto preparations = QuickFixes::PreparationsOf(round.plan);
+    if (isTrial && !preparations.empty()) continue;
+    for (const std::shared_ptr<Computation>& preparation : preparations) preparation->Run();
     QuickFixes::Apply(round.plan);
     if (!round.plan.values.empty()) document.Root().Validate();
   }

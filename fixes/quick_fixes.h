@@ -46,7 +46,10 @@ class QuickFixes {
   /// The search for the files that findings miss. It asks no node.
   static std::shared_ptr<Computed<FilesByName>> SearchFor(const std::vector<FoundAt>& found, const std::string& folder);
 
-  /// Does what was planned. What could not be done is left as it was, and added to what the plan leaves.
+  /// What is to be done before a plan can be, in any thread.
+  static std::vector<std::shared_ptr<Computation>> PreparationsOf(const FixPlan& plan);
+  /// Does what was planned and is prepared. What could not be done is left as it was, and added to what the plan
+  /// leaves.
   static void Apply(FixPlan& plan);
 
  private:
@@ -62,9 +65,10 @@ struct FixRound {
 };
 
 /// Tries the kinds one behind the other (all, or the one of that name), validates behind each that changed something,
-/// and tells what was done. Files are searched at and below `folder`. The document is changed; it is not saved. The
-/// error tells why nothing could be searched; what needs no search is done all the same.
+/// and tells what was done. Files are searched at and below `folder`. The document is changed; it is not saved. A trial
+/// makes no files: what would need one is told and not done. The error tells why nothing could be searched; what needs
+/// no search is done all the same.
 std::vector<FixRound> FixAll(CFlowModelDoc& document, QuickFixes& fixes, const FixKind* only, const std::string& folder,
-                             std::string& error);
+                             bool isTrial, std::string& error);
 
 }  // namespace tervane

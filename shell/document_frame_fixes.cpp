@@ -108,7 +108,10 @@ void DocumentFrame::Fix(const QString& kindName, const std::vector<SetupFinding>
   if (plan.values.size() > 1 &&
       !host_.Choose(tr("Change %1 values?").arg(plan.values.size()), FirstLines(ChangesInWords(plan)), {tr("C&hange")}))
     return;
+  for (const std::shared_ptr<Computation>& preparation : QuickFixes::PreparationsOf(plan))
+    if (!host_.Compute(preparation)) return;
   QuickFixes::Apply(plan);
+  if (plan.values.empty()) return tellLeft();
   document.Root().SetRevalidateAll();
   session_->UpdateDoc(document.Root(), kTreeRebuilt | kDataChanged, FromQt(TitleOf(*kind)));
   emit Told(plan.values.size() == 1 ? ChangesInWords(plan).front() : tr("%1 values changed").arg(plan.values.size()));

@@ -10,6 +10,8 @@ namespace tervane {
 inline constexpr const char* kNotCovering = "The file does not cover the simulation";
 /// What it finds where a file lies in another system of coordinates.
 inline constexpr const char* kOtherProjection = "The file has another projection than the model domain";
+/// What it finds where that system is none of a plane.
+inline constexpr const char* kInDegrees = "The coordinates of the file are in degrees";
 
 /// Of a file that can be read, but whose chosen item or attribute is none that the node can use: the only one it can.
 extern const FixKind kOnlyItem;

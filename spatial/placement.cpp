@@ -96,7 +96,7 @@ std::vector<Finding> FindMisplacement(const FilePlace& place, const GridGeometry
   if (!place.isKnown) return findings;
   if (place.isGeographical) {
     // Degrees and metres have no place in common that could be compared.
-    add(Severity::Warning, "The coordinates of the file are in degrees",
+    add(Severity::Warning, kInDegrees,
         fmt::format("{}; transform it to {}, the system of the model domain",
                     place.projection.empty() ? "its system is not told" : "its system is " + NameOf(place.projection),
                     NameOf(domain.projection)));

@@ -7,8 +7,10 @@
 #include <rapidjson/document.h>
 
 #include "data/datafile_writer.h"
+#include "data/grid_files.h"
 #include "data/series_file.h"
 #include "document/setup_lock.h"
+#include "geometry/cart.h"
 #include "geometry/shapes.h"
 #include "platform/item_types.h"
 #include "spatial/domain.h"
@@ -192,6 +194,49 @@ TEST_F(CheckFixes, TheDomainTakesTheProjectionOfItsShapes) {
   EXPECT_THAT(Fix().out,
               HasSubstr("fix projection: Catchment:MapProjShp: WGS 84 / UTM zone 33N -> WGS 84 / UTM zone 32N"));
   EXPECT_THAT(Fix().out, AllOf(HasSubstr("nothing was fixed"), Not(HasSubstr("another projection"))));
+}
+
+TEST_F(CheckFixes, AFileInAnotherSystemIsConvertedBesideItself) {
+  CFlowModelDoc document;
+  CCatchmentKvf& domain = *document.Root().Important(kDomain);
+  CTvnShapeData shapes;
+  shapes.Create(ShapeKind::Polygon, {{"CODE", AttributeKind::Whole}}, "EPSG:32632");
+  const double x = 500'000, y = 5'000'000;
+  shapes.AddShape(
+      {{{x, y}, {x, y + 1000}, {x + 1000, y + 1000}, {x + 1000, y}, {x, y}}, {}, {}, {0}, {std::int64_t{1}}});
+  test::Require(shapes.SaveShapeFile(folder.File("domain.shp")).error);
+  domain.Type = CCatchmentKvf::kShapeFile;
+  domain.ShapeFile().Choose(FileName("domain.shp", folder.Path()), {});
+  domain.nxShp = domain.nyShp = 10;
+  domain.sizeShp = 100;
+  domain.x0Shp = x;
+  domain.y0Shp = y;
+  domain.MapProjShp = "EPSG:32632";
+  // The same ground in the next zone, where it lies 6 degrees from the middle.
+  const CYbProjectionChange change("EPSG:32633", "EPSG:32632");
+  double otherX = x, otherY = y;
+  ASSERT_TRUE(change.Back(otherX, otherY));
+  CTvn2DOrthoRotatedGridData grid;
+  ASSERT_EQ(grid.SetGridData({40, 40, 100, otherX - 1500, otherY - 1500, 0, "EPSG:32633"}, 5, kUsualDeleteValue, 1000,
+                             quantity::kElevation),
+            "");
+  test::Require(WriteGridData(folder.File("dem.nds2"), grid).error);
+  folder.Write("dem_converted.nds2", "mine");
+  auto& topography = *document.Root().Important(kTopography);
+  topography.Type = CData2DKvf::kGridFile;
+  topography.GridFile().Choose(FileName("dem.nds2", folder.Path()));
+  ASSERT_TRUE(document.OnSaveDocument(file)) << document.Error();
+
+  const std::string told = "fix convert: Topography/NDS_2D_DATA_FILE:FILE_NAME: dem.nds2 -> dem_converted_2.nds2";
+  EXPECT_THAT(Fix({"--dry-run"}).out, HasSubstr(told));
+  EXPECT_FALSE(FileExists(folder.File("dem_converted_2.nds2")));
+  EXPECT_THAT(Fix().out, AllOf(HasSubstr(told), HasSubstr("1 value")));
+  EXPECT_EQ(ReadFile(folder.File("dem_converted.nds2")), "mine");
+  EXPECT_THAT(Tervane({"check", file}).out, Not(HasSubstr("another projection")));
+  CTvn2DOrthoRotatedGridData converted;
+  test::Require(ReadGridData(folder.File("dem_converted_2.nds2"), 1, converted).error);
+  EXPECT_EQ(converted.Geometry().nx, 10);
+  for (int cell = 0; cell < 100; ++cell) EXPECT_FLOAT_EQ(converted.Value(cell % 10, cell / 10), 5);
 }
 
 TEST_F(CheckFixes, WhatCannotBeDoneIsToldAndWritesNothing) {
