@@ -10,6 +10,7 @@
 
 #include "platform/dates.h"
 #include "platform/text.h"
+#include "platform/text_fields.h"
 
 namespace tervane {
 
@@ -152,13 +153,13 @@ CfTimeUnits ParseCfTimeUnits(std::string_view units, std::string_view calendar) 
     result.error = fmt::format(
         "its times are of the calendar \"{}\", whose days are not those of real dates; convert the file to the "
         "standard calendar",
-        calendar);
+        Shown(calendar));
     return result;
   }
   const std::string lower = LowerCase(units);
   const std::size_t since = lower.find(kSince);
-  result.error =
-      fmt::format("its times have the units \"{}\"; units such as \"days since 2000-01-01\" were expected", units);
+  result.error = fmt::format("its times have the units \"{}\"; units such as \"days since 2000-01-01\" were expected",
+                             Shown(units));
   if (since == std::string::npos) return result;
   const std::string name = fmt::format(" {} ", Trimmed(std::string_view(lower).substr(0, since)));
   for (const TimeUnit& unit : kTimeUnits) {
@@ -169,7 +170,8 @@ CfTimeUnits ParseCfTimeUnits(std::string_view units, std::string_view calendar) 
   }
   if (name.find("month") != std::string::npos || name.find("year") != std::string::npos) {
     result.error = fmt::format(
-        "its times have the units \"{}\", and a month or year has no fixed length; convert the times to days", units);
+        "its times have the units \"{}\", and a month or year has no fixed length; convert the times to days",
+        Shown(units));
   }
   return result;
 }

@@ -5,7 +5,6 @@
 #include <algorithm>
 #include <array>
 #include <cstdlib>
-#include <ranges>
 #include <unordered_map>
 #include <unordered_set>
 
@@ -67,7 +66,7 @@ bool IsEdited(CFMSEKvfBase& owner, CFMSEKvfGroupBase& item) {
 
 void RemoveAll(CFMSEKvfBase& owner, const std::vector<CFMSEKvfGroupBase*>& items) {
   // From the back, where the fewest children must move up.
-  for (CFMSEKvfGroupBase* item : std::views::reverse(items)) owner.RemoveChild(item);
+  for (auto item = items.rbegin(); item != items.rend(); ++item) owner.RemoveChild(*item);
 }
 
 /// Sorts the items by their identities; true when they were not in order.

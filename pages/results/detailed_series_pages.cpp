@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "pages/results/detailed_series_pages.h"
 
+#include <algorithm>
 #include <cmath>
-#include <ranges>
 
 #include <fmt/format.h>
 
@@ -251,10 +251,11 @@ void CDetailedTSOutputDlg::Add(const NamedPlaces& read, const std::string& actio
     point.Y = place.y;
   }
   UpdateDoc(kDataChanged | kItemAdded | kRefreshPlots, action);
-  if (!read.notes.empty())
-    Outside().ShowMessage(fmt::format("{} points are added. Not taken:\n{}", read.places.size(),
-                                      fmt::join(read.notes | std::views::take(10), "\n")),
-                          Host::Icon::Warning);
+  if (read.notes.empty()) return;
+  const auto shown = std::min<std::ptrdiff_t>(std::ssize(read.notes), 10);
+  Outside().ShowMessage(fmt::format("{} points are added. Not taken:\n{}", read.places.size(),
+                                    fmt::join(read.notes.begin(), read.notes.begin() + shown, "\n")),
+                        Host::Icon::Warning);
 }
 
 void CDetailedTSOutputDlg::Pick(const Point& point) {
