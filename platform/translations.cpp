@@ -43,7 +43,7 @@ std::optional<std::string> Unquoted(std::string_view text) {
       continue;
     }
     if (++i == text.size()) return {};
-    constexpr std::string_view kEscapes = "nt\"\\", kMeant = "\n\t\"\\";
+    constexpr std::string_view kEscapes = "nrt\"\\", kMeant = "\n\r\t\"\\";
     const std::size_t escape = kEscapes.find(text[i]);
     if (escape == std::string_view::npos) return {};
     plain += kMeant[escape];
