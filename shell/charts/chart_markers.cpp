@@ -254,11 +254,16 @@ bool ChartMarkers::Release(const QMouseEvent& event) {
   const auto pressedAt = std::exchange(pressedAt_, {});
   const bool isClick = pressedAt && (event.position() - *pressedAt).manhattanLength() < kClickRadius;
   if (!request_ || !isClick || !IsInside(event.position())) return false;
+  AnswerWith(charts_.front()->axis(QCPAxis::atBottom)->pixelToCoord(event.position().x()));
+  return false;
+}
+
+bool ChartMarkers::AnswerWith(double place) {
+  if (!request_) return false;
   const DateRequest answered = *std::exchange(request_, {});
   Ask({});
-  const double place = charts_.front()->axis(QCPAxis::atBottom)->pixelToCoord(event.position().x());
   if (answered.taken) answered.taken(DateAt(place, PerPixel()));
-  return false;
+  return true;
 }
 
 bool ChartMarkers::eventFilter(QObject* /*watched*/, QEvent* event) {

@@ -33,6 +33,8 @@ class ChartMarkers : public QObject {
   /// Asks for a date, or no longer.
   void Ask(std::optional<DateRequest> request);
   bool IsAsking() const { return request_.has_value(); }
+  /// Gives the date at that place of the axis of time as the answer; false where none is asked for.
+  bool AnswerWith(double place);
   void ApplyTheme();
   /// Names keep off each other: one that would meet the one before it stands a line lower.
   void Arrange();

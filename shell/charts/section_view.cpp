@@ -341,7 +341,8 @@ void SectionView::Zoom(double factor) {
   chart_->replot(QCustomPlot::rpQueuedReplot);
 }
 
-bool SectionView::Press(int key) {
+bool SectionView::Press(const QKeyEvent& event) {
+  const int key = event.key();
   const auto move = [](QCPAxis* axis, double part) { axis->moveRange(part * axis->range().size()); };
   switch (key) {
     case Qt::Key_Plus:
@@ -350,10 +351,9 @@ bool SectionView::Press(int key) {
     case Qt::Key_Minus:
       return Zoom(1 / kZoomStep), true;
     case Qt::Key_Left:
-      move(chart_->xAxis, -0.15);
-      break;
     case Qt::Key_Right:
-      move(chart_->xAxis, 0.15);
+      if (event.modifiers() & Qt::ControlModifier) return MoveMark(key == Qt::Key_Left ? -1 : 1), true;
+      move(chart_->xAxis, key == Qt::Key_Left ? -0.15 : 0.15);
       break;
     case Qt::Key_Up:
       move(chart_->yAxis, 0.15);
@@ -371,7 +371,7 @@ bool SectionView::Press(int key) {
 }
 
 bool SectionView::eventFilter(QObject* watched, QEvent* event) {
-  if (event->type() == QEvent::KeyPress && !content_.IsEmpty()) return Press(static_cast<QKeyEvent*>(event)->key());
+  if (event->type() == QEvent::KeyPress && !content_.IsEmpty()) return Press(*static_cast<QKeyEvent*>(event));
   if (event->type() == QEvent::Resize) message_->setGeometry(chart_->rect());
   if (event->type() == QEvent::Leave) {
     SetStatus({});
@@ -387,13 +387,42 @@ void SectionView::PointAt(const QMouseEvent* event) {
   if (!pointer_) return;
   const bool isInside = chart_->axisRect()->rect().contains(event->pos());
   const double distance = chart_->xAxis->pixelToCoord(event->position().x());
-  pointer_->setVisible(isInside);
-  pointer_->point1->setCoords(distance, 0);
-  pointer_->point2->setCoords(distance, 1);
-  chart_->layer(kPointerLayer)->replot();
+  mark_.reset();
+  ShowPointer(isInside ? std::optional(distance) : std::nullopt);
   const double height = chart_->yAxis->pixelToCoord(event->position().y());
   SetStatus(isInside ? TextAt(units_->distance.Stored(distance), units_->height.Stored(height)) : QString());
   chart_->setToolTip(isInside ? LayersAt(units_->distance.Stored(distance)) : QString());
+}
+
+void SectionView::ShowPointer(std::optional<double> distance) {
+  pointer_->setVisible(distance.has_value());
+  pointer_->point1->setCoords(distance.value_or(0), 0);
+  pointer_->point2->setCoords(distance.value_or(0), 1);
+  chart_->layer(kPointerLayer)->replot();
+}
+
+void SectionView::MoveMark(int by) {
+  const auto& points = profile_.points;
+  if (!pointer_ || points.empty()) return;
+  const QCPRange& seen = chart_->xAxis->range();
+  if (!mark_ || !seen.contains(units_->distance.Shown(*mark_))) {
+    mark_ = units_->distance.Stored(seen.center());
+  } else {
+    // The next sample that is seen beside this one.
+    const double pixel = units_->distance.Stored(seen.size()) / std::max(chart_->axisRect()->width(), 1);
+    const auto next = std::ranges::find_if(points, [&](const SectionPoint& point) {
+      return by > 0 ? point.distance >= *mark_ + pixel : point.distance > *mark_ - pixel;
+    });
+    const bool isPast = by > 0 ? next == points.end() : next == points.begin();
+    if (!isPast) mark_ = by > 0 ? next->distance : (next - 1)->distance;
+    if (const double shown = units_->distance.Shown(*mark_); !seen.contains(shown)) {
+      chart_->xAxis->moveRange(shown - seen.center());
+      chart_->replot();
+    }
+  }
+  ShowPointer(units_->distance.Shown(*mark_));
+  SetStatus(tr("at %1").arg(units_->distance.Value(std::round(*mark_))) + "   " +
+            LayersAt(*mark_).replace("\n", "   "));
 }
 
 std::optional<std::size_t> SectionView::SampleAt(double distance) const {

@@ -26,7 +26,8 @@ class ReliefWindow;
 
 /// A cut through the ground: named layers as bands over the distance along a line of a map, with the ground on top.
 ///
-/// The wheel zooms along the line, drag moves, a double click or Home shows everything. Heights are exaggerated so that
+/// The wheel zooms along the line, drag moves, a double click or Home shows everything; Ctrl and arrows move a
+/// mark along it, at which all layers are told. Heights are exaggerated so that
 /// they fill the view, or by a number that the user chooses.
 class SectionView : public PlotFrame {
   Q_OBJECT
@@ -75,7 +76,10 @@ class SectionView : public PlotFrame {
   void FitHeights();
   void ShowExaggeration();
   void PointAt(const QMouseEvent* event);
-  bool Press(int key);
+  void ShowPointer(std::optional<double> distance);
+  /// Moves the reading mark to the next sample or, with -1, to the one before.
+  void MoveMark(int by);
+  bool Press(const QKeyEvent& event);
 
   SectionContent content_;
   DisplayUnits displayUnits_;
@@ -93,6 +97,7 @@ class SectionView : public PlotFrame {
   std::vector<QCPItemText*> screenNames_;
   QCPGraph *ground_ = nullptr, *crossing_ = nullptr, *thin_ = nullptr;
   QCPItemStraightLine* pointer_ = nullptr;
+  std::optional<double> mark_;  ///< Where the keyboard points at, in metres.
 };
 
 }  // namespace tervane

@@ -440,7 +440,9 @@ void SeriesPlot::Zoom(double factor) {
   chart_->replot(QCustomPlot::rpQueuedReplot);
 }
 
-bool SeriesPlot::Press(int key) {
+bool SeriesPlot::Press(const QKeyEvent& event) {
+  const int key = event.key();
+  const bool movesMark = event.modifiers() & Qt::ControlModifier;
   switch (key) {
     case Qt::Key_Plus:
     case Qt::Key_Equal:
@@ -450,11 +452,13 @@ bool SeriesPlot::Press(int key) {
       Zoom(1 / kZoomStep);
       return true;
     case Qt::Key_Left:
-      MoveAxis(panels_->Keys(), -0.15);
-      break;
     case Qt::Key_Right:
-      MoveAxis(panels_->Keys(), 0.15);
+      if (movesMark) return MoveMark(key == Qt::Key_Left ? -1 : 1), true;
+      MoveAxis(panels_->Keys(), key == Qt::Key_Left ? -0.15 : 0.15);
       break;
+    case Qt::Key_Return:
+    case Qt::Key_Enter:
+      return mark_ && markers_->AnswerWith(*mark_);
     case Qt::Key_Up:
       for (QCPAxis* axis : panels_->AllValues()) MoveAxis(*axis, 0.15);
       break;
@@ -477,16 +481,12 @@ bool SeriesPlot::Press(int key) {
 }
 
 bool SeriesPlot::eventFilter(QObject* watched, QEvent* event) {
-  if (event->type() == QEvent::KeyPress && !content_.IsEmpty()) return Press(static_cast<QKeyEvent*>(event)->key());
+  if (event->type() == QEvent::KeyPress && !content_.IsEmpty()) return Press(*static_cast<QKeyEvent*>(event));
   if (event->type() == QEvent::Resize) {
     message_->setGeometry(chart_->rect());
     if (PanelsInSight() != panelsInSight_) BuildPanels();
   }
-  if (event->type() == QEvent::Leave) {
-    SetStatus({});
-    for (QCPItemStraightLine* pointer : pointers_) pointer->setVisible(false);
-    chart_->layer(kPointerLayer)->replot();
-  }
+  if (event->type() == QEvent::Leave) ShowPointer({});
   return PlotFrame::eventFilter(watched, event);
 }
 
@@ -494,15 +494,41 @@ void SeriesPlot::PointAt(const QMouseEvent* event) {
   if (pointers_.empty()) return;
   const bool isInside = std::ranges::any_of(
       panels_->Rects(), [&](const QCPAxisRect* rect) { return rect->rect().contains(event->pos()); });
-  const double place = panels_->Keys().pixelToCoord(event->position().x());
+  mark_.reset();
+  ShowPointer(isInside ? std::optional(panels_->Keys().pixelToCoord(event->position().x())) : std::nullopt);
+}
+
+void SeriesPlot::ShowPointer(std::optional<double> place) {
   for (QCPItemStraightLine* pointer : pointers_) {
-    pointer->setVisible(isInside);
-    pointer->point1->setCoords(place, 0);
-    pointer->point2->setCoords(place, 1);
+    pointer->setVisible(place.has_value());
+    pointer->point1->setCoords(place.value_or(0), 0);
+    pointer->point2->setCoords(place.value_or(0), 1);
   }
   // The curves stay as they are drawn.
   chart_->layer(kPointerLayer)->replot();
-  SetStatus(isInside ? TextAt(place) : QString());
+  SetStatus(place ? TextAt(*place) : QString());
+}
+
+void SeriesPlot::MoveMark(int by) {
+  QCPAxis& keys = panels_->Keys();
+  if (!mark_ || !keys.range().contains(*mark_)) {
+    mark_ = keys.range().center();
+  } else {
+    // The next value that is seen beside this one.
+    const double pixel = keys.range().size() / std::max(keys.axisRect()->width(), 1);
+    mark_ = *mark_ + by * pixel;
+    if (!curves_.empty() && !curves_.front().graph->data()->isEmpty()) {
+      const auto& points = *curves_.front().graph->data();
+      auto at = points.findBegin(*mark_, false);
+      if (by < 0 && at != points.constBegin()) --at;
+      if (at != points.constEnd()) mark_ = at->key;
+    }
+    if (!keys.range().contains(*mark_)) {
+      keys.moveRange(*mark_ - keys.range().center());
+      chart_->replot();
+    }
+  }
+  ShowPointer(mark_);
 }
 
 QString SeriesPlot::TextAt(double time) const {

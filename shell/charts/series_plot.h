@@ -35,7 +35,7 @@ class TimeBarPlottable;
 ///
 /// The wheel zooms in time towards the pointer (with Ctrl in the values), drag moves, Shift and drag zooms to a box, a
 /// double click or Home shows everything; + - and the arrows do the same from the keyboard, Page Up and Page Down
-/// scroll.
+/// scroll. Ctrl and arrows point at one value after the other, Enter gives the date that is asked for.
 class SeriesPlot : public PlotFrame {
   Q_OBJECT
 
@@ -96,7 +96,11 @@ class SeriesPlot : public PlotFrame {
   /// As many columns of names and ticks as there is room for.
   void Arrange();
   void PointAt(const QMouseEvent* event);
-  bool Press(int key);
+  /// Tells the values at a place of the axis, or none.
+  void ShowPointer(std::optional<double> place);
+  /// Moves the reading mark to the next value of the first curve or, with -1, to the one before.
+  void MoveMark(int by);
+  bool Press(const QKeyEvent& event);
   QImage Picture(double pixelRatio);
 
   SeriesContent given_, content_;  ///< As the page tells it, and as it is shown.
@@ -115,6 +119,7 @@ class SeriesPlot : public PlotFrame {
   std::vector<QCPItemRect*> periods_;  ///< Of each chart.
   std::vector<QCPItemRect*> hatches_;  ///< Where there are no data.
   std::vector<QCPItemStraightLine*> pointers_;
+  std::optional<double> mark_;  ///< Where the keyboard points at.
   std::vector<QCPItemText*> titles_;
   int panelCount_ = 1;                               ///< Of the content.
   int firstPanel_ = 0, panelsInSight_ = 1;           ///< Those that are made.

@@ -96,7 +96,10 @@ void MapCanvas::SetContent(MapContent content, const DisplayUnits* units) {
   for (const LineLayer& layer : content_.lines) lines_.emplace_back(layer, units_);
   FollowBackdrop(content_.below, below_);
   FollowBackdrop(content_.above, above_);
-  if (wasEmpty || WholeArea() != area) isFitted_ = true;
+  if (wasEmpty || WholeArea() != area) {
+    isFitted_ = true;
+    DropMark();
+  }
   Arrange();
 }
 
@@ -397,6 +400,7 @@ void MapCanvas::paintEvent(QPaintEvent* /*event*/) {
                 isDrag ? std::optional(window_.ToMap(pressedAt_)) : std::nullopt);
     painter.restore();
   }
+  if (mark_ && !content_.IsEmpty()) DrawMark(painter);
   if (gesture_ != Gesture::Box) return;
   QColor veil = palette().color(QPalette::Highlight);
   painter.setPen(QPen(veil, 1.5));

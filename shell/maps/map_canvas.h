@@ -59,9 +59,15 @@ class MapCanvas : public QWidget {
 
   /// The part of the map that is seen, in the canvas's own coordinates.
   const MapWindow& Window() const { return window_; }
+  /// The place that the keyboard points at; nothing until it does.
+  const std::optional<MapPoint>& ReadingMark() const { return mark_; }
   /// What the user reads of a place: coordinates, cell, value, shape.
   QString TextAt(MapPoint place) const;
   QString Summary() const;
+  /// What is drawn, for those who do not see it: legends and how many shapes, lines and points there are.
+  QString LayersInWords() const;
+  /// The pointer or the reading mark is on the map.
+  bool IsPointedAt() const { return isPointed_; }
   void Fit();
   /// Shows more (above 1) or less; the place at that point of the screen stays there.
   void Zoom(double factor, QPointF around);
@@ -135,6 +141,13 @@ class MapCanvas : public QWidget {
   void Answer();
   void GiveUp();
   bool PressInRequest(int key);
+  /// Moves the reading mark by pixels, and the map along where the mark would leave it.
+  void MoveMark(QPointF by);
+  void PointAtMark();
+  void DropMark();
+  /// Does what a click at the reading mark does.
+  void ClickAtMark();
+  void DrawMark(QPainter& painter);
   QString DrawnText(MapPoint place) const;
   /// What the legend tells, from the top down.
   std::vector<LegendBlock> Legends() const;
@@ -168,6 +181,7 @@ class MapCanvas : public QWidget {
   std::optional<MapRequest> request_;
   std::optional<MapDrag> drag_;
   std::vector<MapPoint> drawn_;  ///< Points of a line that is asked for.
+  std::optional<MapPoint> mark_;
   MapWindow window_;
   QRectF legendPlace_;
   double legendScroll_ = 0;  ///< How many pixels of the legend are above its place.
@@ -178,7 +192,7 @@ class MapCanvas : public QWidget {
   Gesture gesture_ = Gesture::None;
   bool isSecondClick_ = false;
   bool isTaken_ = false;    ///< The last click gave a point that was asked for.
-  bool isPointed_ = false;  ///< The pointer is over the map.
+  bool isPointed_ = false;  ///< The pointer is over the map, or the keyboard points at a place.
   bool hasLayersInLegend_ = false;
   std::optional<GridGeometry> cellLines_;
   bool isPassing_ = false;  ///< The first grid has but some of its cells.

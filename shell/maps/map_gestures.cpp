@@ -20,23 +20,48 @@ namespace {
 constexpr double kClickRadius = 4;  ///< In pixels at zoom 1.
 constexpr double kZoomStep = 1.5;
 
+constexpr double kTargetSize = 27;  ///< In pixels at zoom 1.
+constexpr double kMarkStep = 10;    ///< The same, by which a key moves the reading mark.
+
 /// A circle with a cross that leaves its middle free.
+void DrawTarget(QPainter& painter, QPointF middle, double size, double zoom) {
+  painter.setRenderHint(QPainter::Antialiasing);
+  painter.setBrush(Qt::NoBrush);
+  const double radius = size * 0.3, gap = size * 0.1, arm = size / 2 - 1;
+  for (const QPen& pen : {QPen(Qt::white, 3.2 * zoom), QPen(QColor(0x1d, 0x22, 0x2a), 1.4 * zoom)}) {
+    painter.setPen(pen);
+    painter.drawEllipse(middle, radius, radius);
+    for (const double side : {-1.0, 1.0}) {
+      painter.drawLine(middle + QPointF(side * gap, 0), middle + QPointF(side * arm, 0));
+      painter.drawLine(middle + QPointF(0, side * gap), middle + QPointF(0, side * arm));
+    }
+  }
+}
+
 QCursor TargetCursor(double zoom) {
-  const int size = static_cast<int>(std::lround(27 * zoom)) | 1;
+  const int size = static_cast<int>(std::lround(kTargetSize * zoom)) | 1;
   QPixmap picture(size, size);
   picture.fill(Qt::transparent);
   QPainter painter(&picture);
-  painter.setRenderHint(QPainter::Antialiasing);
-  const double middle = size / 2.0, radius = size * 0.3, gap = size * 0.1;
-  for (const QPen& pen : {QPen(Qt::white, 3.2 * zoom), QPen(QColor(0x1d, 0x22, 0x2a), 1.4 * zoom)}) {
-    painter.setPen(pen);
-    painter.drawEllipse(QPointF(middle, middle), radius, radius);
-    for (const double side : {-1.0, 1.0}) {
-      painter.drawLine(QPointF(middle + side * gap, middle), QPointF(middle + side * (middle - 1), middle));
-      painter.drawLine(QPointF(middle, middle + side * gap), QPointF(middle, middle + side * (middle - 1)));
-    }
-  }
+  DrawTarget(painter, QPointF(size, size) / 2, size, zoom);
+  painter.end();
   return QCursor(picture);
+}
+
+/// The way in which an arrow key leads; nothing for another key.
+QPointF WayOf(int key) {
+  switch (key) {
+    case Qt::Key_Left:
+      return {-1, 0};
+    case Qt::Key_Right:
+      return {1, 0};
+    case Qt::Key_Up:
+      return {0, -1};
+    case Qt::Key_Down:
+      return {0, 1};
+    default:
+      return {};
+  }
 }
 
 }  // namespace
@@ -54,6 +79,7 @@ void MapCanvas::mousePressEvent(QMouseEvent* event) {
   const bool isMoving = event->button() == Qt::MiddleButton && drag_ && gesture_ == Gesture::None;
   if ((event->button() != Qt::LeftButton && !isMoving) || content_.IsEmpty()) return QWidget::mousePressEvent(event);
   setFocus(Qt::MouseFocusReason);
+  mark_.reset();
   pressedAt_ = draggedTo_ = event->position();
   isSecondClick_ = isTaken_ = false;
   if (drag_ && !isMoving && window_.rect.contains(pressedAt_)) {
@@ -133,6 +159,9 @@ void MapCanvas::wheelEvent(QWheelEvent* event) {
 }
 
 void MapCanvas::keyPressEvent(QKeyEvent* event) {
+  const QPointF way = WayOf(event->key());
+  if (!way.isNull() && (event->modifiers() & Qt::ControlModifier))
+    return MoveMark(way * (event->modifiers() & Qt::ShiftModifier ? 1 : Scaled(kMarkStep)));
   if (request_ && PressInRequest(event->key())) return;
   // Whole pixels, by which what is drawn can be moved.
   const double step = std::round(0.15 * std::min(window_.rect.width(), window_.rect.height()));
@@ -143,13 +172,13 @@ void MapCanvas::keyPressEvent(QKeyEvent* event) {
     case Qt::Key_Minus:
       return Zoom(1 / kZoomStep);
     case Qt::Key_Left:
-      return Pan({step, 0});
     case Qt::Key_Right:
-      return Pan({-step, 0});
     case Qt::Key_Up:
-      return Pan({0, step});
     case Qt::Key_Down:
-      return Pan({0, -step});
+      return Pan(-step * way);
+    case Qt::Key_Return:
+    case Qt::Key_Enter:
+      return mark_ ? ClickAtMark() : QWidget::keyPressEvent(event);
     case Qt::Key_PageUp:
       return ScrollLegend(-legendPlace_.height() / 2);
     case Qt::Key_PageDown:
@@ -158,11 +187,67 @@ void MapCanvas::keyPressEvent(QKeyEvent* event) {
       return Fit();
     case Qt::Key_Escape:
       if (gesture_ == Gesture::Drag) return EndDrag({});
+      if (gesture_ == Gesture::None && mark_) return DropMark();
       gesture_ = Gesture::None;
       return update();
     default:
       QWidget::keyPressEvent(event);
   }
+}
+
+// ---- The reading mark, which the keyboard moves in the place of a pointer
+
+void MapCanvas::MoveMark(QPointF by) {
+  if (content_.IsEmpty()) return;
+  if (!mark_ || !window_.rect.contains(window_.ToScreen(*mark_))) {
+    mark_ = window_.ToMap(window_.rect.center());
+    return PointAtMark();
+  }
+  const QPointF to = window_.ToScreen(*mark_) + by;
+  mark_ = window_.ToMap(to);
+  if (!window_.rect.contains(to)) Pan((window_.rect.center() - to) / 2);
+  PointAtMark();
+}
+
+void MapCanvas::PointAtMark() {
+  // What follows the pointer follows the mark.
+  draggedTo_ = window_.ToScreen(*mark_);
+  isPointed_ = true;
+  emit PointedAt(DrawnText(*mark_) + TextAt(*mark_));
+  update();
+}
+
+void MapCanvas::DropMark() {
+  if (!std::exchange(mark_, {})) return;
+  isPointed_ = false;
+  emit PointedAt({});
+  update();
+}
+
+void MapCanvas::ClickAtMark() {
+  const MapPoint place = *mark_;
+  if (request_) {
+    // The second time at one place is what a double click is.
+    const std::vector<MapPoint> before = drawn_;
+    TakeClick(place);
+    if (request_ && drawn_ == before) return EndLine();
+    isTaken_ = false;
+    return mark_ ? PointAtMark() : update();
+  }
+  if (drag_) {
+    if (drag_->moved) drag_->moved(place, place);
+    return EndDrag(place);
+  }
+  // The page may be replaced by what the click does.
+  if (const auto picked = content_.picked) picked(PickAt(place));
+}
+
+void MapCanvas::DrawMark(QPainter& painter) {
+  painter.save();
+  painter.setClipRect(window_.rect);
+  const double zoom = Theme::Get().Zoom();
+  DrawTarget(painter, window_.ToScreen(*mark_), kTargetSize * zoom, zoom);
+  painter.restore();
 }
 
 void MapCanvas::SetDrag(std::optional<MapDrag> drag) {
@@ -243,7 +328,10 @@ bool MapCanvas::PressInRequest(int key) {
       return true;
     case Qt::Key_Return:
     case Qt::Key_Enter:
-      EndLine();
+      if (mark_)
+        ClickAtMark();
+      else
+        EndLine();
       return true;
     case Qt::Key_Backspace:
       if (!drawn_.empty()) drawn_.pop_back();

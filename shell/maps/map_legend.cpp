@@ -106,6 +106,36 @@ void MapCanvas::SetLayersInLegend(bool isOn) {
   Arrange();
 }
 
+QString MapCanvas::LayersInWords() const {
+  constexpr std::size_t kMostNames = 8;
+  QStringList parts;
+  for (const LegendBlock& legend : Legends()) {
+    QStringList names;
+    for (const LegendRow& row : legend.rows)
+      if (!row.text.isEmpty()) names << row.text;
+    const auto count = static_cast<std::size_t>(names.size()) + legend.hidden;
+    // Of a scale its ends tell enough.
+    if (legend.isScale && names.size() > 2) names = {names.front(), "…", names.back()};
+    if (!legend.isScale && count > kMostNames) names = names.mid(0, kMostNames) << HiddenText(count - kMostNames);
+    parts << (legend.title.isEmpty() ? QString() : legend.title + ": ") + names.join(legend.isScale ? " " : ", ");
+  }
+  const auto add = [&parts](const QString& text, std::size_t count) {
+    if (count > 0) parts << text.arg(count);
+  };
+  std::size_t shapes = 0, lines = 0, points = 0;
+  for (const ShapeLayer& layer : content_.shapes) shapes += layer.shapes ? layer.shapes->GetData().size() : 0;
+  for (const LineLayer& layer : content_.lines) lines += layer.lines ? layer.lines->size() : 0;
+  for (const PointLayer& layer : content_.points) points += layer.points.size();
+  add(tr("Shapes: %1"), shapes);
+  add(tr("Lines: %1"), lines);
+  add(tr("Points: %1"), points);
+  QStringList backdrop;
+  for (const auto* layers : {&content_.above, &content_.below})
+    for (auto layer = layers->rbegin(); layer != layers->rend(); ++layer) backdrop << Translated(layer->title);
+  if (!backdrop.isEmpty()) parts << tr("Backdrop: %1").arg(backdrop.join(", "));
+  return parts.join("; ");
+}
+
 QString MapCanvas::HiddenText(std::size_t count) const { return tr("and %n more", nullptr, static_cast<int>(count)); }
 
 double MapCanvas::LegendWidth() const {

@@ -291,6 +291,13 @@ void MapView::ShowWhenThere(const std::function<MapContent()>& content, const Di
   Show(std::move(now), units);
 }
 
+QString MapView::Description() const {
+  if (canvas_->IsPointedAt()) return Status();
+  QStringList parts{Status(), canvas_->LayersInWords()};
+  parts.removeAll(QString());
+  return parts.join("\n");
+}
+
 bool MapView::IsBusy() const { return PlotFrame::IsBusy() || canvas_->IsPreparing(); }
 
 }  // namespace tervane

@@ -15,7 +15,8 @@ class ReliefWindow;
 /// A map of a page with its status line and buttons.
 ///
 /// Drag moves it, the wheel zooms towards the pointer, Shift and drag zooms to a box, a double click or Home shows
-/// everything; + - and the arrows do the same from the keyboard. Layers of the backdrop are switched and made
+/// everything; + - and the arrows do the same from the keyboard. Ctrl and arrows move a mark in the place of the
+/// pointer, at which Enter clicks. Layers of the backdrop are switched and made
 /// transparent here for the looking alone.
 class MapView : public PlotFrame {
   Q_OBJECT
@@ -54,6 +55,8 @@ class MapView : public PlotFrame {
   ReliefWindow* OpenRelief();
 
  protected:
+  /// What is pointed at; else what there is to see.
+  QString Description() const override;
   void dragEnterEvent(QDragEnterEvent* event) override;
   void dropEvent(QDropEvent* event) override;
 

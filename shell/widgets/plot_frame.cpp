@@ -45,7 +45,7 @@ PlotFrame::PlotFrame(Host& host, QWidget* parent) : QWidget(parent), host_(host)
 
 void PlotFrame::Hold(Plot plot) {
   plot_ = std::move(plot);
-  DescribeDrawing(*plot_.widget, [this] { return Status(); });
+  DescribeDrawing(*plot_.widget, [this] { return Description(); });
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(2);

@@ -46,6 +46,8 @@ class PlotFrame : public QWidget {
  protected:
   PlotFrame(Host& host, QWidget* parent);
   void Hold(Plot plot);
+  /// What a screen reader tells of the plot.
+  virtual QString Description() const { return Status(); }
   Host& Outside() const { return host_; }
   /// A further control in front of the buttons.
   void AddToRow(QWidget* tool);

@@ -87,6 +87,16 @@ TEST(ChartMarkers, ADateIsAskedForUntilAClickOrEsc) {
   EXPECT_EQ(left, 1);
   QTest::mouseClick(&year.plot.Chart(), Qt::LeftButton, {}, year.At(55));
   EXPECT_EQ(taken.size(), 1U);
+  // Without a mouse: at the reading mark.
+  year.content.request->prompt = "Click the sowing.";
+  year.plot.Show(year.content);
+  QTest::keyClick(&year.plot.Chart(), Qt::Key_Return);
+  EXPECT_EQ(taken.size(), 1U) << "nothing is pointed at";
+  for (int i = 0; i < 3; ++i) QTest::keyClick(&year.plot.Chart(), Qt::Key_Left, Qt::ControlModifier);
+  QTest::keyClick(&year.plot.Chart(), Qt::Key_Return);
+  ASSERT_EQ(taken.size(), 2U);
+  EXPECT_LT(taken[1], Day(50));
+  EXPECT_GT(taken[1], Day(10));
 }
 
 }  // namespace

@@ -65,6 +65,20 @@ TEST(SectionView, LayersAreBandsDownToTheirBottoms) {
   EXPECT_TRUE(section.View().TextAt(6000, 20).isEmpty());
 }
 
+TEST(SectionView, KeysMoveAMarkThatTellsAllLayers) {
+  ShownSection section(Ground());
+  const auto move = [&](Qt::Key key) {
+    QTest::keyClick(&section.View().Chart(), key, Qt::ControlModifier);
+    return section.View().Status().toStdString();
+  };
+  EXPECT_THAT(move(Qt::Key_Right), testing::HasSubstr("at 2450 m   ground 40 m   Clay down to"));
+  const std::string right = move(Qt::Key_Right);
+  EXPECT_THAT(right, testing::HasSubstr("ground 40 m"));
+  EXPECT_NE(right, move(Qt::Key_Left));
+  for (int i = 0; i < 2000; ++i) move(Qt::Key_Left);
+  EXPECT_THAT(move(Qt::Key_Left), testing::StartsWith("at 0 m"));
+}
+
 TEST(SectionView, AChosenExaggerationStaysAtEveryZoom) {
   ShownSection section(Ground());
   EXPECT_GT(section.View().Exaggeration(), 20);

@@ -78,6 +78,28 @@ TEST(SeriesPlot, TheValuesUnderThePointerAreToldAndAStepHoldsBeforeItsTime) {
             "2000-01-03 00:00:00\t\t3\n2000-01-04 00:00:00\t7\t4\n2000-01-05 00:00:00\t1\t5\n");
 }
 
+TEST(SeriesPlot, KeysPointAtOneValueAfterTheOther) {
+  SeriesContent content;
+  content.series = {Daily("Level", "m", {1, 2, 3, 4, 5})};
+  ShownChart chart(content);
+  const auto move = [&](Qt::Key key) {
+    QTest::keyClick(&chart.Chart(), key, Qt::ControlModifier);
+    return chart.Plot().Status().toStdString();
+  };
+  EXPECT_EQ(move(Qt::Key_Right), chart.Plot().TextAt(chart.Chart().xAxis->range().center()).toStdString());
+  EXPECT_EQ(move(Qt::Key_Right), "2000/01/04 00:00   Level 4 m");
+  EXPECT_EQ(move(Qt::Key_Left), "2000/01/03 00:00   Level 3 m");
+  EXPECT_EQ(move(Qt::Key_Left), "2000/01/02 00:00   Level 2 m");
+  // What is seen goes along.
+  chart.Plot().Zoom(4);
+  move(Qt::Key_Right);
+  const QCPRange seen = chart.Chart().xAxis->range();
+  EXPECT_EQ(move(Qt::Key_Right), "2000/01/04 00:00   Level 4 m");
+  EXPECT_NE(chart.Chart().xAxis->range(), seen);
+  Hover(chart.Chart(), {2, 2});
+  EXPECT_EQ(chart.Plot().Status(), "");
+}
+
 TEST(SeriesPlot, TheListOfFurtherSeriesIsSearchedAndWhatIsCheckedIsLaidOverTheChart) {
   std::vector<SeriesOffer> offers;
   for (int i = 0; i < 30; ++i) offers.push_back({"Gauge " + std::to_string(i), i < 20 ? "Stations" : "File", "f", i});

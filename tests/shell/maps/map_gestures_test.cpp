@@ -120,5 +120,90 @@ TEST_F(MapGestures, ALineGrowsByClicksAndEndsWithADoubleClick) {
   EXPECT_NEAR(page.answer[0].x, 6100, 10);
 }
 
+// ---- Without a mouse
+
+TEST_F(MapGestures, KeysMoveAMarkThatTellsItsPlaceAndStaysOnTheMap) {
+  const auto move = [this](Qt::Key key, Qt::KeyboardModifiers more = {}) {
+    QTest::keyClick(&Map().Canvas(), key, Qt::ControlModifier | more);
+    return *Map().Canvas().ReadingMark();
+  };
+  EXPECT_FALSE(Map().Canvas().ReadingMark());
+  const MapPoint first = move(Qt::Key_Right), middle = Map().Canvas().Window().centre;
+  EXPECT_NEAR(first.x, middle.x, Pixel());
+  EXPECT_NEAR(first.y, middle.y, Pixel());
+  const struct {
+    Qt::Key key;
+    Qt::KeyboardModifiers more;
+    double x, y;
+  } steps[] = {{Qt::Key_Right, {}, 10, 0},
+               {Qt::Key_Up, {}, 0, 10},
+               {Qt::Key_Left, Qt::ShiftModifier, -1, 0},
+               {Qt::Key_Down, Qt::ShiftModifier, 0, -1}};
+  for (const auto& step : steps) {
+    const MapPoint before = *Map().Canvas().ReadingMark(), after = move(step.key, step.more);
+    EXPECT_NEAR(after.x - before.x, step.x * Pixel(), 1e-6);
+    EXPECT_NEAR(after.y - before.y, step.y * Pixel(), 1e-6);
+  }
+  const MapPoint at = *Map().Canvas().ReadingMark();
+  EXPECT_EQ(Map().View().Status(), Map().Canvas().TextAt(at));
+  EXPECT_THAT(FromQt(Map().View().Status()), HasSubstr("cell "));
+  // The map goes along with a mark that would leave it, and keeps it otherwise.
+  for (int i = 0; i < 60; ++i) move(Qt::Key_Right);
+  EXPECT_GT(Map().Canvas().Window().centre.x, middle.x);
+  EXPECT_TRUE(Map().Canvas().Window().rect.contains(Map().At(*Map().Canvas().ReadingMark())));
+  const MapPoint kept = *Map().Canvas().ReadingMark();
+  Press(Qt::Key_Plus);
+  EXPECT_EQ(*Map().Canvas().ReadingMark(), kept);
+  Press(Qt::Key_Escape);
+  EXPECT_FALSE(Map().Canvas().ReadingMark());
+  EXPECT_EQ(Map().View().Status(), Map().Canvas().Summary());
+}
+
+TEST_F(MapGestures, EnterClicksAtTheMark) {
+  const auto move = [this](Qt::Key key) {
+    for (int i = 0; i < 4; ++i) QTest::keyClick(&Map().Canvas(), key, Qt::ControlModifier);
+    return *Map().Canvas().ReadingMark();
+  };
+  Press(Qt::Key_Return);
+  EXPECT_EQ(page.picks, 0) << "nothing is pointed at";
+  move(Qt::Key_Up);
+  Press(Qt::Key_Return);
+  EXPECT_EQ(page.picks, 1);
+  MapPoint taken;
+  page.question.AskPoint("Click the well.", [&](MapPoint point) { taken = point; });
+  MapPoint at = move(Qt::Key_Left);
+  Press(Qt::Key_Return);
+  EXPECT_NEAR(taken.x, at.x, Pixel());
+  EXPECT_NEAR(taken.y, at.y, Pixel());
+  EXPECT_FALSE(page.question.IsAsked());
+  // The second Enter at one place ends a line, which one point is not.
+  AskLine("Draw the section.");
+  Press(Qt::Key_Return);
+  Press(Qt::Key_Return);
+  EXPECT_TRUE(page.question.IsAsked());
+  at = move(Qt::Key_Down);
+  Press(Qt::Key_Return);
+  EXPECT_THAT(FromQt(Map().View().Status()), HasSubstr("length "));
+  Press(Qt::Key_Return);
+  EXPECT_FALSE(page.question.IsAsked());
+  ASSERT_EQ(page.answer.size(), 2U);
+  EXPECT_NEAR(page.answer[1].y, at.y, Pixel());
+  EXPECT_EQ(page.picks, 1);
+}
+
+TEST_F(MapGestures, EnterPaintsWhereADragWould) {
+  std::vector<MapPoint> painted;
+  int ends = 0;
+  Map().Canvas().SetDrag(MapDrag{[&](MapPoint /*from*/, MapPoint to) { painted.push_back(to); },
+                                 [&](std::optional<MapPoint> place) { ends += place.has_value(); },
+                                 {}});
+  QTest::keyClick(&Map().Canvas(), Qt::Key_Up, Qt::ControlModifier);
+  Press(Qt::Key_Return);
+  ASSERT_EQ(painted.size(), 1U);
+  EXPECT_EQ(painted[0], *Map().Canvas().ReadingMark());
+  EXPECT_EQ(ends, 1);
+  EXPECT_EQ(page.picks, 0);
+}
+
 }  // namespace
 }  // namespace tervane::map_gestures_test
