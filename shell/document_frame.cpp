@@ -7,6 +7,7 @@
 #include <QFileInfo>
 #include <QIODevice>
 #include <QSplitter>
+#include <QTabBar>
 #include <QTabWidget>
 #include <QVBoxLayout>
 #include <algorithm>
@@ -32,6 +33,7 @@
 #include "shell/run/log_view.h"
 #include "shell/run/run_panel.h"
 #include "shell/text/text_view.h"
+#include "shell/widgets/drawing_access.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 #include "wqpt/kinetra_specification.h"
@@ -123,6 +125,9 @@ void DocumentFrame::BuildBody() {
   tree(kResultsTree, tr("Results"), tr("Nothing yet: no simulation has left results for this setup."));
   connect(treeTabs_, &QTabWidget::tabBarClicked, this, [this](int tab) {
     if (tab >= 0) ShowTree(tab);
+  });
+  connect(treeTabs_, &QTabWidget::currentChanged, this, [this](int tab) {
+    if (treeTabs_->tabBar()->hasFocus()) ShowTree(tab);
   });
   find_ = new FindPanel(session_->Document(), treeTabs_);
   connect(find_, &FindPanel::HitChosen, this, [this](quint64 serial, const QString& control) {
@@ -403,8 +408,8 @@ void DocumentFrame::FocusNextPane() {
     // A page may have nothing that takes the keyboard.
     if (QApplication::focusWidget() == focus) bottomTabs_->currentWidget()->setFocus();
   } else if (holds(middle_)) {
-    bottomTabs_->currentWidget()->setFocus();
-  } else {
+    if (IsTextShown() || !page_ || !page_->FocusOnPlot()) bottomTabs_->currentWidget()->setFocus();
+  } else if (!find_->FocusOnHits()) {
     treeTabs_->currentWidget()->setFocus();
   }
 }
@@ -455,6 +460,7 @@ bool DocumentFrame::Save(const std::string& path) {
     return false;
   }
   Log(tr("Saved as %1").arg(ToQt(path)));
+  emit Told(tr("Saved as %1").arg(ToQt(path)));
   for (const std::string& note : session_->Document().SaveNotes()) Log(Translated(note));
   if (diskBanner_) diskBanner_->deleteLater();
   program_.AddRecentFile(ToQt(path));
@@ -469,6 +475,7 @@ void DocumentFrame::ShowBanner(const QString& text, const std::vector<Banner::An
 void DocumentFrame::AddBanner(Banner* banner) {
   // At the foot: what comes while somebody works must move nothing.
   all_->addWidget(banner);
+  Announce(*banner, banner->accessibleName());
 }
 
 void DocumentFrame::ShowLoadReport() {

@@ -15,6 +15,7 @@
 #include "shell/page/page_view.h"
 #include "shell/run/document_run.h"
 #include "shell/run/log_view.h"
+#include "shell/widgets/drawing_access.h"
 #include "shell/widgets/qt_text.h"
 
 namespace tervane {
@@ -34,7 +35,10 @@ void DocumentFrame::ShowFindings() {
   if (runBanner_) runBanner_->Age(whyPast.isEmpty() ? QString() : tr("The setup has changed since."));
   findings_->Show(std::move(findings));
   const int count = findings_->Count();
-  bottomTabs_->setTabText(bottomTabs_->indexOf(findings_), count ? tr("Findings (%1)").arg(count) : tr("Findings"));
+  const QString title = count ? tr("Findings (%1)").arg(count) : tr("Findings");
+  const int tab = bottomTabs_->indexOf(findings_);
+  if (title != bottomTabs_->tabText(tab)) Announce(*findings_, title);
+  bottomTabs_->setTabText(tab, title);
 }
 
 // ---- The run

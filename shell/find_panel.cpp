@@ -75,6 +75,12 @@ void FindPanel::Start() {
   field_->selectAll();
 }
 
+bool FindPanel::FocusOnHits() {
+  const bool areShown = stack_->currentIndex() == 1;
+  if (areShown) list_->setFocus();
+  return areShown;
+}
+
 void FindPanel::Forget() {
   index_.reset();
   if (!field_->text().isEmpty()) Find();

@@ -25,6 +25,8 @@ class FindPanel : public QWidget {
 
   /// Puts the keyboard into the field.
   void Start();
+  /// Puts the keyboard on the list of what was found; false where the trees are shown.
+  bool FocusOnHits();
   /// The setup is another one now: what is sought is sought anew.
   void Forget();
 

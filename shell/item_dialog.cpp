@@ -35,6 +35,7 @@ ItemDialog::ItemDialog(const Host::ItemQuestion& question, QWidget* parent) : QD
     // It can be pointed at, to read why.
     for (int i = 0; i < list_->columnCount(); ++i) item->setForeground(i, theme.QuietColor());
     item->setIcon(0, theme.Icon("warning"));
+    item->setData(0, Qt::AccessibleDescriptionRole, tr("It cannot be chosen: %1.").arg(ToQt(row.refusal)));
   }
   for (int i = 0; i < list_->columnCount(); ++i) list_->resizeColumnToContents(i);
   all->addWidget(list_, 1);

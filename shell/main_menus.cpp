@@ -38,6 +38,7 @@
 #include "shell/run_comparison_view.h"
 #include "shell/template_tab.h"
 #include "shell/welcome_page.h"
+#include "shell/widgets/keys_dialog.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/shown_language.h"
 #include "shell/widgets/theme.h"
@@ -145,10 +146,10 @@ void MainWindow::BuildMenus() {
   AddForDocument(file, tr("&Export as MODFLOW 6…"), nullptr, {},
                  [this](DocumentFrame& frame) { ExportToModflow6(frame.Session().Document(), host_); });
   file->addSeparator();
-  Command& closeTab =
-      Add(file, tr("&Close"), nullptr, QKeySequence::Close, [this] { CloseTab(tabs_->currentWidget()); });
+  Command& closeTab = Add(file, tr("&Close"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_W),
+                          [this] { CloseTab(tabs_->currentWidget()); });
   closeTab.enabled = [this] { return tabs_->count() > 0; };
-  Add(file, tr("&Quit"), nullptr, QKeySequence::Quit, [this] { close(); });
+  Add(file, tr("&Quit"), nullptr, QKeySequence(Qt::CTRL | Qt::Key_Q), [this] { close(); });
   standardBar_->addActions({create.action, open.action, save.action});
   standardBar_->addSeparator();
 
@@ -376,29 +377,13 @@ void MainWindow::BuildHelpMenu() {
     if (!frame.OnHelp()) keys_->trigger();
   });
   Command& keys = Add(help, tr("&Keys"), nullptr, {}, [this] {
-    QString rows;
+    std::vector<KeyRow> rows;
     for (const auto& command : commands_)
       if (!command->action->shortcut().isEmpty())
-        rows += QString("<tr><td>%1&nbsp;&nbsp;</td><td>%2</td></tr>")
-                    .arg(QKeySequence::listToString(command->action->shortcuts(), QKeySequence::NativeText)
-                             .replace("; ", ", "),
-                         command->name.toHtmlEscaped());
-    const std::pair<QString, QString> ofWidgets[] = {
-        {"Esc", tr("In a field: back to the value of the setup")},
-        {tr("Up, Down"), tr("In a date: count the part at the cursor")},
-        {"F2", tr("In a table: edit the cell")},
-        {"Ctrl+D", tr("In a table: fill down")},
-        {tr("Del"), tr("In a table: clear texts")},
-        {"Ctrl+Insert", tr("In a table: insert a row")},
-        {"Ctrl+Del", tr("In a table: delete the row")},
-        {tr("Ctrl+Up, Ctrl+Down"), tr("In a table: move the row")},
-        {"M, B, L, P, F", tr("In a grid that is edited: move, brush, line, polygon, fill")},
-        {"R, A", tr("In a grid that is edited: select a rectangle, an area")},
-        {"[, ]", tr("In a grid that is edited: a smaller, a larger brush")},
-    };
-    for (const auto& [key, what] : ofWidgets)
-      rows += QString("<tr><td>%1&nbsp;&nbsp;</td><td>%2</td></tr>").arg(key, what);
-    QMessageBox::information(this, tr("Keys"), "<table>" + rows + "</table>");
+        rows.push_back(
+            {QKeySequence::listToString(command->action->shortcuts(), QKeySequence::NativeText).replace("; ", ", "),
+             command->name});
+    KeysDialog(rows, this).exec();
   });
   keys_ = keys.action;
   Add(help, tr("&About Quarzel"), nullptr, {}, [this] {

@@ -181,7 +181,10 @@ QWidget* ControlWidget::MakeUnit() {
 void ControlWidget::SyncUnit() {
   const QString unit = Translated(control_.UnitText());
   if (auto* label = qobject_cast<QLabel*>(unit_)) label->setText(unit);
-  if (auto* button = qobject_cast<QToolButton*>(unit_)) button->setText(unit);
+  if (auto* button = qobject_cast<QToolButton*>(unit_)) {
+    button->setText(unit);
+    button->setAccessibleName(tr("Unit of %1: %2").arg(Translated(control_.label), unit));
+  }
 }
 
 void ControlWidget::SyncSubject() {

@@ -112,6 +112,10 @@ class LineWidget : public ControlWidget {
         Enter(ToQt(Described().Text()));
         return true;
       }
+      if (calendar_ && key == Qt::Key_Down && (static_cast<QKeyEvent*>(event)->modifiers() & Qt::AltModifier)) {
+        calendar_->click();
+        return true;
+      }
       if (Described().kind == ControlKind::Date && (key == Qt::Key_Up || key == Qt::Key_Down))
         return StepDate(key == Qt::Key_Up ? 1 : -1);
     }
@@ -147,9 +151,9 @@ class LineWidget : public ControlWidget {
     return true;
   }
   QWidget* CalendarButton() {
-    auto* button = new QToolButton;
+    auto* button = calendar_ = new QToolButton;
     button->setIcon(Theme::Get().Icon("calendar"));
-    button->setToolTip(tr("Choose a day"));
+    button->setToolTip(tr("Choose a day (Alt+Down)"));
     button->setAccessibleName(tr("Calendar for %1").arg(Translated(Described().label)));
     QMenu* menu = NewCalendarMenu(
         button, [this] { return ToQt(Described().Text()); }, [this](const QString& date) { Enter(date); });
@@ -192,7 +196,7 @@ class LineWidget : public ControlWidget {
   }
 
   QLineEdit* edit_;
-  QToolButton* color_ = nullptr;
+  QToolButton *color_ = nullptr, *calendar_ = nullptr;
   bool edited_ = false;
 };
 

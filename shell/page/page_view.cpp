@@ -502,6 +502,19 @@ void PageView::FocusOn(const std::string& key) {
   found->FocusTarget()->setFocus(Qt::ShortcutFocusReason);
 }
 
+bool PageView::FocusOnPlot() {
+  const QWidget* focus = QApplication::focusWidget();
+  if (!plotPlace_ || (focus && plotPlace_->isAncestorOf(focus))) return false;
+  for (const auto& widget : widgets_) {
+    QWidget* target = widget->FocusTarget();
+    if (!target || !target->isVisible() || !plotPlace_->isAncestorOf(target)) continue;
+    if (!arePlotsBeside_) scroll_->ensureWidgetVisible(target);
+    target->setFocus(Qt::ShortcutFocusReason);
+    return true;
+  }
+  return false;
+}
+
 std::string PageView::NameOf(const void* control) const {
   for (std::size_t i = 0; control && i < widgets_.size(); ++i) {
     const Control& described = widgets_[i]->Described();

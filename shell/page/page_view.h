@@ -42,6 +42,8 @@ class PageView : public QWidget {
   void Commit();
   /// Puts the keyboard on the control of a key, or with that label; the first control when there is none.
   void FocusOn(const std::string& key);
+  /// Puts the keyboard on the map or chart of the page; false where there is none, or it is there already.
+  bool FocusOnPlot();
   /// The name by which a control of this page is found again on a page that is made anew; empty for no control of it.
   std::string NameOf(const void* control) const;
   /// Puts the keyboard on the control of that name and lets it stand out for a moment.

@@ -453,6 +453,11 @@ bool TableView::eventFilter(QObject* watched, QEvent* event) {
   if (watched == view_ && (isPress || event->type() == QEvent::KeyRelease)) {
     const auto* keys = static_cast<QKeyEvent*>(event);
     if (event->type() == QEvent::KeyPress && TakeKey(*keys)) return true;
+    const bool isNext = keys->key() == Qt::Key_PageDown;
+    // Tab goes from cell to cell, of which there may be thousands.
+    if (event->type() == QEvent::KeyPress && keys->modifiers() == Qt::ControlModifier &&
+        (isNext || keys->key() == Qt::Key_PageUp))
+      return focusNextPrevChild(isNext);
     if (keys->modifiers() & Qt::ControlModifier) {
       std::optional<RowAction> action;
       if (keys->key() == Qt::Key_Insert) action = RowAction::Insert;

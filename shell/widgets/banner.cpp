@@ -30,6 +30,7 @@ QColor BackgroundOf(Banner::Tone tone, bool isDark) {
 Banner::Banner(const QString& text, const std::vector<Answer>& answers, Tone tone) : text_(text) {
   const Theme& theme = Theme::Get();
   setAutoFillBackground(true);
+  setAccessibleName(text);
   QPalette palette = this->palette();
   palette.setColor(QPalette::Window, BackgroundOf(tone, theme.IsDark()));
   setPalette(palette);
