@@ -113,7 +113,7 @@ const SetupKeys::Parts& SetupKeys::Written(CYbSEKvfBase& node) {
   }
   const auto [place, isNew] = written_.try_emplace(node.Serial());
   if (isNew)
-    ForParts(node, [&](CYbSEKvfBase& part) {
+    ForParts(node, [&, place = place](CYbSEKvfBase& part) {
       place->second.push_back({&part, Begin(*kept_, "Node")});
       WriteNode(part, *kept_);
       kvfEndSection(kept_.get());

@@ -59,7 +59,8 @@ std::string WhyNever(const TypeLine& line) {
   if (!line.type.isShown) return "exchanged with other models alone";
   if (line.ways.empty()) return "no setup brings it in";
   for (const auto& [bit, why] : kFeaturesOfRuns)
-    if (std::ranges::all_of(line.ways, [&](RequirementMask way) { return way.Contains(bit); })) return std::string(why);
+    if (std::ranges::all_of(line.ways, [bit = bit](RequirementMask way) { return way.Contains(bit); }))
+      return std::string(why);
   return {};
 }
 

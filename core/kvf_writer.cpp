@@ -250,6 +250,12 @@ void AppendKvfNodes(const KvfSection& section, int level, std::string& text) {
   TextWriter(text).Nodes(section, 2 * static_cast<std::size_t>(level));
 }
 
+std::string KvfTextInside(const KvfSection& section) {
+  std::string text;
+  AppendKvfNodes(section, 0, text);
+  return text;
+}
+
 bool WriteKvfText(const KvfFile& file, std::string& text, std::string& error) {
   text.clear();
   if (!file.unwritable.empty()) {

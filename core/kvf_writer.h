@@ -15,6 +15,8 @@ bool WriteKvfText(const KvfFile& file, std::string& text, std::string& error);
 
 /// The children of a section as text, indented by `level` steps.
 void AppendKvfNodes(const KvfSection& section, int level, std::string& text);
+/// The same as a text of its own.
+std::string KvfTextInside(const KvfSection& section);
 
 /// One value as it stands in a file: `6f`, `"a \"text\""`, `file "maps/x.nds2"`.
 std::string KvfValueText(const KvfParam& param);

@@ -21,7 +21,10 @@
 #include <rapidjson/stringbuffer.h>
 #include <rapidjson/writer.h>
 
+#include "core/kvf_writer.h"
+#include "core/path.h"
 #include "document/flow_model_document.h"
+#include "document/journal_sections.h"
 #include "platform/csv_cell.h"
 #include "platform/files.h"
 #include "platform/os.h"
@@ -220,10 +223,23 @@ JournalKeeper::JournalKeeper(const CFlowModelDoc& document)
 
 void JournalKeeper::Take(const CFlowModelDoc& document, std::string action, std::string page) {
   OpenKvf now(document.BuildFile(document.Root().SetupFolder()));
+  const std::string target = document.Root().GetTargetName();
+  // Sections that are longer come and go by undo alone.
+  constexpr std::size_t kLongestSection = std::size_t{1} << 16;
+  const auto textAt = [&](KvfFile& file, const std::string& path) {
+    const KvfSection* section = FindSection(file, target, ParseSetupPath(path).steps);
+    std::string text = section ? KvfTextInside(*section) : std::string();
+    return text.size() <= kLongestSection ? text : std::string();
+  };
   JournalStep step;
-  for (SetupDifference& difference : CompareFiles(*known_, *now, document.Root().GetTargetName()))
-    step.changes.push_back({difference.kind, std::move(difference.path), std::move(difference.key),
-                            std::move(difference.from), std::move(difference.to)});
+  for (SetupDifference& difference : CompareFiles(*known_, *now, target)) {
+    JournalChange& change =
+        step.changes.emplace_back(JournalChange{difference.kind, std::move(difference.path), std::move(difference.key),
+                                                std::move(difference.from), std::move(difference.to)});
+    if (!change.key.empty()) continue;
+    if (change.kind == SetupDifference::Kind::Added) change.to = textAt(*now, change.path);
+    if (change.kind == SetupDifference::Kind::Removed) change.from = textAt(*known_, change.path);
+  }
   known_ = std::move(now);
   if (step.changes.empty()) return;
   step.action = std::move(action);

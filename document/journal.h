@@ -20,7 +20,8 @@ class CYbSEKvfBase;
 /// A key that a step has given another value, or an item that it has added, removed or moved.
 struct JournalChange {
   SetupDifference::Kind kind = SetupDifference::Kind::Changed;
-  std::string path, key, from, to;  ///< As of a difference.
+  /// As of a difference. Of a whole section `from` or `to` is what stood or stands in it, unless that is very long.
+  std::string path, key, from, to;
 
   bool operator==(const JournalChange&) const = default;
 };
@@ -58,9 +59,9 @@ bool IsInJournalStep(const JournalStep& step, std::string_view text);
 /// The steps as a table (CSV) with a row for each change.
 std::string JournalCsv(const std::vector<JournalStep>& steps);
 
-/// Takes a step back on its own: all its keys get what they held before it. Nothing, with the reason, where the setup
-/// holds another value by now, where the step is one of items, and where more than these keys would change. Else the
-/// node that has changed, to be told to the document.
+/// Takes a step back on its own: all its keys get what they held before it, items that it added go, and those that it
+/// removed come again. Nothing, with the reason, where the setup holds another value or item by now, where items were
+/// moved, and where more than the step would change. Else the node that has changed, to be told to the document.
 CYbSEKvfBase* TakeBackStep(CFlowModelDoc& document, const JournalStep& step, std::string& problem);
 
 /// Saves a setup that was changed without an editor. Where a journal stands beside the file that is replaced, what

@@ -69,12 +69,6 @@ void ForEachChild(const KvfSection& section, bool keywords, Use use) {
     if (node->IsKeyword() == keywords) use(*node, ++instances[node->Name()]);
 }
 
-std::string TextInside(const KvfSection& section) {
-  std::string text;
-  AppendKvfNodes(section, 0, text);
-  return text;
-}
-
 class Taking {
  public:
   explicit Taking(CFlowModelDoc& document) : document_(document) {}
@@ -170,7 +164,7 @@ class Taking {
     }
     std::size_t front = 0, behind = 0;
     const std::size_t shorter = std::min(olds.size(), news.size());
-    const auto isAlike = [](const KvfSection& a, const KvfSection& b) { return TextInside(a) == TextInside(b); };
+    const auto isAlike = [](const KvfSection& a, const KvfSection& b) { return KvfTextInside(a) == KvfTextInside(b); };
     while (front < shorter && isAlike(*olds[front], *news[front])) ++front;
     while (behind < shorter - front && isAlike(*olds[olds.size() - 1 - behind], *news[news.size() - 1 - behind]))
       ++behind;
@@ -223,11 +217,11 @@ class Check {
     std::unordered_set<std::string> known;
     if (before)
       ForEachChild(*before, false, [&](KvfNode& section, int /*instance*/) {
-        known.insert(NumberlessPath(section.Name()) + TextInside(*AsSection(&section)));
+        known.insert(NumberlessPath(section.Name()) + KvfTextInside(*AsSection(&section)));
       });
     ForEachChild(after, false, [&](KvfNode& section, int instance) {
       const std::string kind = NumberlessPath(section.Name());
-      if (known.contains(kind + TextInside(*AsSection(&section)))) {
+      if (known.contains(kind + KvfTextInside(*AsSection(&section)))) {
         ++places[kind];
         return;
       }

@@ -16,6 +16,8 @@ template <class... Parts>
 struct Each : Parts... {
   using Parts::operator()...;
 };
+template <class... Parts>
+Each(Parts...) -> Each<Parts...>;
 
 std::string EnterCheck(bool& value, const std::string& typed) {
   const std::string_view text = Trimmed(typed);

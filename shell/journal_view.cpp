@@ -176,12 +176,14 @@ void JournalView::Fill() {
   const auto showChange = [&](QTreeWidgetItem& item, const JournalChange& change) {
     item.setText(kJournalPlace, placeOf(change.path, change.key));
     item.setToolTip(kJournalPlace, ToQt(change.key.empty() ? change.path : change.path + ":" + change.key));
-    item.setText(kJournalBefore, JournalText(change.from));
+    // Of a whole section its text stands in the tips alone.
+    if (!change.key.empty()) item.setText(kJournalBefore, JournalText(change.from));
     item.setText(kJournalAfter, change.kind == SetupDifference::Kind::Changed
                                     ? JournalText(change.to)
                                     : Translated(std::string(NameOf(change.kind))));
-    item.setToolTip(kJournalBefore, ToQt(change.from));
-    item.setToolTip(kJournalAfter, ToQt(change.to));
+    constexpr qsizetype kLongestTip = 1000;
+    item.setToolTip(kJournalBefore, ToQt(change.from).left(kLongestTip));
+    item.setToolTip(kJournalAfter, ToQt(change.to).left(kLongestTip));
     item.setData(0, kJournalPathRole, ToQt(change.path));
     item.setData(0, kJournalKeyRole, ToQt(change.key));
   };

@@ -120,8 +120,8 @@ TEST_F(Journalled, EachStepStandsWithItsKeysBeforeAndAfter) {
     std::string text = step.action + "|" + step.page + "|";
     for (const JournalChange& change : step.changes)
       if (change.key != "NoOfParams")
-        text += std::string(NameOf(change.kind)) + " " + change.path + ":" + change.key + " " + change.from + ">" +
-                change.to;
+        text += std::string(NameOf(change.kind)) + " " + change.path + ":" + change.key + " " +
+                (change.key.empty() ? std::string(">") : change.from + ">" + change.to);
     told.push_back(text);
   }
   EXPECT_THAT(told, ElementsAre("Change Title|SimSpec/SimTitle|changed SimSpec/SimTitle:Title \"\">\"first\"",
@@ -205,6 +205,44 @@ TEST_F(Journalled, AStepIsTakenBackWhereItsValuesStillStand) {
   EXPECT_EQ(test::SavedText(session->Document()), before);
 }
 
+TEST_F(Journalled, ItemsOfAStepGoAndComeAgain) {
+  for (int number = 2; number <= 4; ++number) {
+    Parameters().AddItem()->Name = "added " + std::to_string(number);
+    session->UpdateDoc(Parameters(), 1, "Add Parameter");
+  }
+  Parameters().GetItem(4)->Type = 1;
+  Parameters().GetItem(4)->IntegerValue = 44;
+  session->UpdateDoc(Parameters(), 1, "Change Value");
+  Parameters().DeleteItem(2, 1);
+  session->UpdateDoc(Parameters(), 1, "Delete Parameter");
+  SetTitle("later");
+  const auto names = [&] {
+    std::vector<std::string> all;
+    for (int number = 1; number <= Parameters().GetItemCount(); ++number)
+      all.push_back(Parameters().GetItem(number)->Name);
+    return all;
+  };
+  const std::string first = Parameters().GetItem(1)->Name;
+  const std::string before = test::SavedText(session->Document());
+  const std::vector<JournalStep> steps = Steps();
+  std::vector<std::string> actions;
+  for (const JournalStep& step : steps) actions.push_back(step.action);
+  ASSERT_THAT(actions, ElementsAre("Add Parameter", "Add Parameter", "Add Parameter", "Change Value",
+                                   "Delete Parameter", "Change Title"));
+  EXPECT_EQ(session->TakeBack(steps[4]), "") << "the one that was deleted comes to its place";
+  EXPECT_THAT(names(), ElementsAre(first, "added 2", "added 3", "added 4"));
+  EXPECT_EQ(session->TakeBack(steps[1]), "");
+  EXPECT_THAT(names(), ElementsAre(first, "added 2", "added 4"));
+  EXPECT_EQ(Parameters().GetItem(3)->IntegerValue, 44);
+  EXPECT_EQ(Title().Title, "later");
+  // The last one stands at another place by now, and has another value.
+  EXPECT_EQ(session->TakeBack(steps[2]), "ExtraParams/ExtraParam_4 is no more in the setup");
+  ASSERT_TRUE(session->Undo());
+  EXPECT_EQ(session->TakeBack(steps[2]), "ExtraParams/ExtraParam_4 is no more as it was added");
+  ASSERT_TRUE(session->Undo());
+  EXPECT_EQ(test::SavedText(session->Document()), before);
+}
+
 TEST_F(Journalled, WhatCannotBeTakenBackIsToldAndChangesNothing) {
   SetTitle("first");
   SetTitle("second");
@@ -215,7 +253,8 @@ TEST_F(Journalled, WhatCannotBeTakenBackIsToldAndChangesNothing) {
   const std::string before = test::SavedText(session->Document());
   EXPECT_EQ(session->TakeBack(steps[0]),
             "SimSpec/SimTitle:Title holds \"second\" now, and no more \"first\", which the step gave it");
-  EXPECT_THAT(session->TakeBack(steps[2]), HasSubstr("only values can be taken back on their own"));
+  JournalStep moved{{}, {}, {}, {}, {{Kind::Moved, "ExtraParams/ExtraParam_1", {}, "ExtraParam_2", "ExtraParam_1"}}};
+  EXPECT_EQ(session->TakeBack(moved), "ExtraParams/ExtraParam_1 was moved: that goes back by undo alone");
   JournalStep made{{}, {}, {}, {}, {{Kind::Changed, "Nowhere", "Key", "1", "2"}}};
   EXPECT_EQ(session->TakeBack(made), "Nowhere is no more in the setup");
   made.changes = {{Kind::Changed, "SimSpec/SimTitle", "Key", "1", "2"}};
