@@ -117,6 +117,11 @@ void Translations::SortTemplates() {
   }
 }
 
+void Translations::AddPairs(std::string_view text, Pairs& pairs) {
+  for (std::size_t i = 1; i < text.size(); ++i)
+    pairs.set((static_cast<unsigned char>(text[i - 1]) * 31U + static_cast<unsigned char>(text[i])) % 256);
+}
+
 std::vector<std::string> Translations::Templates() const {
   std::vector<std::string> texts;
   for (const Template& each : templates_) texts.push_back(each.english);
@@ -136,7 +141,10 @@ void Translations::Take(const std::string& context, const std::string& english, 
   if (!exact_.emplace(english, translated).second) return Refuse(line, "this text has an entry already");
   texts_.push_back(english);
   if (!isTemplate) return;
-  Template made{english, {""}, translated};
+  Template made;
+  made.english = english;
+  made.translated = translated;
+  made.literals.emplace_back();
   for (std::size_t i = 0; i < english.size(); ++i) {
     if (IsPlaceholder(english, i)) {
       ++i;
@@ -147,6 +155,7 @@ void Translations::Take(const std::string& context, const std::string& english, 
       ++made.length;
     }
   }
+  for (const std::string& literal : made.literals) AddPairs(literal, made.pairs);
   templates_.push_back(std::move(made));
 }
 
@@ -161,7 +170,10 @@ std::optional<std::string> Translations::Exact(std::string_view english) const {
 
 std::optional<std::string> Translations::Finished(std::string_view english, int depth) const {
   if (auto found = Exact(english)) return found;
-  if (english.empty() || depth > kDeepest) return {};
+  // Numbers and dates are many.
+  if (depth > kDeepest || std::ranges::none_of(english, IsLetterByte)) return {};
+  Pairs pairs;
+  AddPairs(english, pairs);
   // The three lists as one, in the order of the templates.
   const std::vector<std::uint32_t>* lists[] = {&byFirst_[static_cast<unsigned char>(english.front())],
                                                &byLast_[static_cast<unsigned char>(english.back())], &byLast_[0]};
@@ -172,7 +184,9 @@ std::optional<std::string> Translations::Finished(std::string_view english, int 
       if (next[i] < lists[i]->size() && (list == std::size(lists) || (*lists[i])[next[i]] < (*lists[list])[next[list]]))
         list = i;
     if (list == std::size(lists)) break;
-    if (auto found = ByTemplate(templates_[(*lists[list])[next[list]++]], english, depth)) return found;
+    const Template& candidate = templates_[(*lists[list])[next[list]++]];
+    if ((candidate.pairs & ~pairs).any()) continue;
+    if (auto found = ByTemplate(candidate, english, depth)) return found;
   }
   return ByLines(english, depth);
 }

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <array>
+#include <bitset>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -36,11 +37,16 @@ class Translations {
   std::vector<std::string> Templates() const;
 
  private:
+  /// Which pairs of neighbouring bytes a text has: what lacks one of a template's is not of its form.
+  using Pairs = std::bitset<256>;
+  static void AddPairs(std::string_view text, Pairs& pairs);
+
   struct Template {
     std::string english;
     std::vector<std::string> literals;  ///< What stands before, between and behind the values.
     std::string translated;
     std::size_t length = 0;  ///< Of the literals.
+    Pairs pairs;             ///< Of their bytes.
     std::size_t letters = 0;
   };
 

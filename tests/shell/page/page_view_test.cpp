@@ -14,6 +14,7 @@
 #include <gmock/gmock.h>
 
 #include "shell/maps/map_canvas.h"
+#include "shell/widgets/shown_language.h"
 #include "shell/widgets/theme.h"
 #include "tests/shell/opened_setup.h"
 #include "tests/shell/rich_setups.h"
@@ -189,8 +190,14 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
   const struct {
     double zoom;
     QSize window;
-  } cases[] = {{1, {1280, 800}}, {1.5, {1280, 800}}, {1, {900, 600}}};
-  for (const auto& [zoom, window] : cases) {
+    const char* language;
+  } cases[] = {{1, {1280, 800}, "en"},
+               {1.5, {1280, 800}, "en"},
+               {1, {900, 600}, "en"},
+               {1, {1280, 800}, "de"},
+               {1, {900, 600}, "de"}};
+  for (const auto& [zoom, window, language] : cases) {
+    const ShownLanguage shown(language);
     Theme::Get().SetZoom(zoom);
     for (const char* sections : test::kRichSetups) {
       OpenedSetup setup(sections, window);
@@ -208,7 +215,7 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
       if (sections == test::kRichSetups[0]) add(kResultsTree);
       paths.emplace_back("CCoverageKvf");
       for (const std::string& path : paths) {
-        SCOPED_TRACE(path + " at " + std::to_string(zoom));
+        SCOPED_TRACE(path + " at " + std::to_string(zoom) + ", " + language);
         setup.GoTo(path);
         QApplication::processEvents();
         // Layouts within layouts settle one after the other.
