@@ -32,12 +32,12 @@ CompareView::CompareView(EditSession& session, const QString& name, std::unique_
   all->addWidget(told_);
   auto* buttons = new QHBoxLayout;
   buttons->addStretch();
-  take_ = new QPushButton(tr("&Take This"));
+  take_ = new QPushButton(tr("Ta&ke This"));
   take_->setToolTip(
       tr("Gives this key the value that it has in %1, adds an item that only %1 has, or removes one that it has not; "
          "Undo takes that back")
           .arg(otherName_));
-  show_ = new QPushButton(tr("&Show on Its Page"));
+  show_ = new QPushButton(tr("Show on Its &Page"));
   buttons->addWidget(take_);
   buttons->addWidget(show_);
   all->addLayout(buttons);

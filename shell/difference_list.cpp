@@ -3,6 +3,7 @@
 #include "shell/difference_list.h"
 
 #include <QHeaderView>
+#include <algorithm>
 
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
@@ -42,9 +43,11 @@ DifferenceList::DifferenceList(const QString& from, const QString& to) {
   setAlternatingRowColors(true);
   setUniformRowHeights(true);
   setHeaderLabels({tr("Section and key"), tr("Change"), from, to});
-  setColumnWidth(0, theme.Scaled(340));
-  setColumnWidth(1, theme.Scaled(90));
-  setColumnWidth(2, theme.Scaled(190));
+  constexpr int kWidths[] = {0, 90, 190, 190};
+  header()->setStretchLastSection(false);
+  header()->setSectionResizeMode(0, QHeaderView::Stretch);
+  for (int column = 1; column < 4; ++column)
+    setColumnWidth(column, std::max(theme.Scaled(kWidths[column]), header()->sectionSizeHint(column)));
 }
 
 void DifferenceList::Show(std::vector<SetupDifference> differences) {

@@ -22,6 +22,7 @@ ItemDialog::ItemDialog(const Host::ItemQuestion& question, QWidget* parent) : QD
   auto* all = new QVBoxLayout(this);
   all->addWidget(new QLabel(QDir::toNativeSeparators(ToQt(question.file))));
   list_ = new QTreeWidget;
+  list_->setAccessibleName(windowTitle());
   list_->setRootIsDecorated(false);
   list_->setAlternatingRowColors(true);
   list_->setItemDelegate(new RowDelegate(list_));

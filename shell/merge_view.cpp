@@ -68,9 +68,9 @@ MergeView::MergeView(MergeFiles files, Host& host)
     return made;
   };
   button(tr("All &Mine"), tr("Takes mine of every conflict"), [this] { TakeAll(MergeSide::Mine); });
-  button(tr("All &Theirs"), tr("Takes theirs of every conflict"), [this] { TakeAll(MergeSide::Theirs); });
+  button(tr("All The&irs"), tr("Takes theirs of every conflict"), [this] { TakeAll(MergeSide::Theirs); });
   row->addStretch();
-  button(tr("&Save Merged…"), tr("Writes the merged setup and opens it"), [this] { AskAndSave(); })->setDefault(true);
+  button(tr("Save Mer&ged…"), tr("Writes the merged setup and opens it"), [this] { AskAndSave(); })->setDefault(true);
   all->addLayout(row);
   Merge();
 }

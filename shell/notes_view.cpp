@@ -102,7 +102,7 @@ NotesView::NotesView(EditSession& session, Host& host, Program& program, NodeOf 
     filter_->addItem(StateText(state), static_cast<int>(state));
   filter_->setAccessibleName(tr("Which notes are listed"));
   row->addWidget(filter_);
-  answer_ = AddFlatButton(*row, tr("Ans&wer…"), [this] { AskForAnswer(); });
+  answer_ = AddFlatButton(*row, tr("&Answer…"), [this] { AskForAnswer(); });
   done_ = AddFlatButton(*row, tr("Done"), [this] {
     if (const PlacedNote* chosen = Chosen())
       SetState(chosen->note.name, chosen->note.state == ReviewState::Done ? ReviewState::Open : ReviewState::Done);

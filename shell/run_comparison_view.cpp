@@ -77,6 +77,7 @@ QWidget* RunComparisonView::BuildPoints(const RunComparison& comparison) {
   for (const auto& [name, figure] : kFigures)
     heads << tr("%1, first").arg(name) << tr("%1, second").arg(name) << tr("Difference");
   auto* table = new QTableWidget(static_cast<int>(comparison.points.size()), static_cast<int>(heads.size()));
+  table->setAccessibleName(tr("Statistics"));
   table->setHorizontalHeaderLabels(heads);
   table->setEditTriggers(QAbstractItemView::NoEditTriggers);
   table->setAlternatingRowColors(true);

@@ -26,6 +26,7 @@ WhyDialog::WhyDialog(const QString& title, const std::vector<Explanation>& expla
   setWindowTitle(title);
   const Theme& theme = Theme::Get();
   resize(theme.Scaled(680), theme.Scaled(explanations.size() > 1 ? 480 : 260));
+  list_->setAccessibleName(title);
   list_->setHeaderLabels({tr("Reason"), tr("Page")});
   list_->setItemDelegate(new RowDelegate(list_));
   list_->setUniformRowHeights(true);

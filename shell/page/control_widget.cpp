@@ -21,6 +21,7 @@ namespace tervane {
 namespace {
 
 constexpr int kWidestLabel = 280;  ///< In pixels at zoom 1; a longer label breaks into lines.
+constexpr int kMostLabelPixels = 440;
 constexpr int kMarkSize = 16, kDotSize = 6;
 
 /// Stands behind a value that is not its default.
@@ -49,7 +50,8 @@ QString WithoutMarks(QString text) { return text.replace("&", "&&"); }
 QLabel* NewLabel(const QString& text, int widest) {
   auto* label = new QLabel(text);
   label->setTextFormat(Qt::PlainText);
-  const int limit = Theme::Get().Scaled(widest);
+  // At a large zoom a label breaks earlier: the field beside it needs its room too.
+  const int limit = std::min(Theme::Get().Scaled(widest), std::max(widest, kMostLabelPixels));
   if (label->sizeHint().width() > limit) {
     label->setWordWrap(true);
     label->setFixedWidth(limit);

@@ -89,6 +89,7 @@ void TableView::MakeFilter() {
   filter_->setClearButtonEnabled(true);
   filter_->setMaximumWidth(Theme::Get().Scaled(200));
   static_cast<QHBoxLayout*>(layout()->itemAt(0)->layout())->insertWidget(0, filter_);
+  setTabOrder(filter_, view_);
   connect(filter_, &QLineEdit::textChanged, this, [this](const QString& typed) {
     Commit();
     control_.table->Filter(FromQt(typed));
@@ -491,7 +492,7 @@ int TableView::WidthOf(int column) const {
   const int padding = Theme::Get().Scaled(14), icon = shown.icon ? Theme::Get().Scaled(24) : 0;
   QFont bold = view_->font();
   bold.setBold(true);
-  int width = QFontMetrics(bold).horizontalAdvance(ToQt(table.Head(column)));
+  int width = QFontMetrics(bold).horizontalAdvance(Translated(table.Head(column)));
   bool isAny = false;
   for (int row = 1; row <= std::min(table.RowCount(), kLookedAt); ++row) {
     const QString text = ToQt(table.ShownCell(row, column));
@@ -507,7 +508,8 @@ int TableView::WidthOfHeadWords(int column) const {
   bold.setBold(true);
   const QFontMetrics metrics(bold);
   int widest = 0;
-  for (const QString& word : ToQt(control_.table->Head(column)).split(QRegularExpression("\\s"), Qt::SkipEmptyParts))
+  for (const QString& word :
+       Translated(control_.table->Head(column)).split(QRegularExpression("\\s"), Qt::SkipEmptyParts))
     widest = std::max(widest, metrics.horizontalAdvance(word));
   return widest + Theme::Get().Scaled(10);
 }
@@ -550,9 +552,11 @@ void TableView::FitColumns() {
   QHeaderView& head = *view_->horizontalHeader();
   for (int column = 0; column < model_->columnCount(); ++column) {
     const TableColumn& shown = *control_.table->Column(column + 1);
-    const int width = WidthOf(column + 1);
+    // Whatever the language makes of a head, its words stay whole; one over several columns has more room.
+    const int words = control_.table->HeadSpan(column + 1) == 1 ? WidthOfHeadWords(column + 1) : 0;
+    const int width = std::max(WidthOf(column + 1), words);
     head.setSectionResizeMode(column, shown.IsButton() ? QHeaderView::Fixed : QHeaderView::Interactive);
-    const int smallest = std::min(std::max(Theme::Get().Scaled(75), WidthOfHeadWords(column + 1)), width);
+    const int smallest = std::min(std::max(Theme::Get().Scaled(75), words), width);
     head.resizeSection(column, shown.IsButton() ? width : std::max(smallest, std::min(width, widest)));
   }
   const TableColumn* last = control_.table->Column(model_->columnCount());

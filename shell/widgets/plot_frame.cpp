@@ -122,6 +122,14 @@ void PlotFrame::showEvent(QShowEvent* event) {
 void PlotFrame::AddToRow(QWidget* tool) {
   constexpr int kBehindStatus = 2;
   row_->insertWidget(kBehindStatus, tool);
+  // The Tab key goes from left to right.
+  QWidget* before = plot_.widget;
+  for (int place = kBehindStatus; place < row_->count(); ++place) {
+    QWidget* next = row_->itemAt(place)->widget();
+    if (!next) continue;
+    setTabOrder(before, next);
+    before = next;
+  }
 }
 
 QAction* PlotFrame::AddCommand(const QString& text, std::function<void()> command) {

@@ -15,6 +15,8 @@
 #include "shell/changes_dialog.h"
 #include "shell/widgets/banner.h"
 #include "shell/widgets/theme.h"
+#include "tests/shell/all_windows.h"
+#include "tests/shell/cut_texts.h"
 #include "tests/shell/next_answer.h"
 #include "tests/shell/opened_setup.h"
 
@@ -90,6 +92,27 @@ TEST(MainWindow, EveryLetterMeansOneThing) {
     }
   EXPECT_GE(buttons, 3);
   CheckLetters(bar);
+}
+
+TEST(MainWindow, NoWindowHasACutText) {
+  const struct {
+    double zoom;
+    bool isLong;
+  } cases[] = {{1, false}, {1.5, false}, {2, false}, {1, true}};
+  for (const auto& [zoom, isLong] : cases) {
+    std::optional<test::LongTexts> texts;
+    if (isLong) texts.emplace();
+    Theme::Get().SetZoom(zoom);
+    int count = 0;
+    test::LookAtAllWindows([&](const std::string& name, QWidget& window) {
+      SCOPED_TRACE(name + " at " + std::to_string(zoom) + (isLong ? " with long texts" : ""));
+      for (int i = 0; i < 3; ++i) QApplication::processEvents();
+      EXPECT_EQ(test::CutTexts(window), "");
+      ++count;
+    });
+    EXPECT_GT(count, 25);
+  }
+  Theme::Get().SetZoom(1);
 }
 
 TEST(MainWindow, AFileThatAnotherProgramChangedIsNotSavedOverWithoutALook) {

@@ -10,12 +10,14 @@
 #include <QScrollBar>
 #include <QTableView>
 #include <algorithm>
+#include <optional>
 
 #include <gmock/gmock.h>
 
 #include "shell/maps/map_canvas.h"
 #include "shell/widgets/shown_language.h"
 #include "shell/widgets/theme.h"
+#include "tests/shell/cut_texts.h"
 #include "tests/shell/opened_setup.h"
 #include "tests/shell/rich_setups.h"
 #include "tests/support/preprocessed_run.h"
@@ -154,33 +156,63 @@ TEST(PageView, AHiddenTableLeavesItsRoom) {
   EXPECT_LT((*parameters)->mapTo(&ShownPage(setup), QPoint()).y(), 300);
 }
 
+/// What the Tab key comes to on a page, in its order.
+std::vector<QWidget*> TabChain(PageView& page) {
+  std::vector<QWidget*> chain;
+  QWidget* widget = &page;
+  while ((widget = widget->nextInFocusChain()) != &page) {
+    const bool takesTab = (widget->focusPolicy() & Qt::TabFocus) && !widget->focusProxy();
+    if (page.isAncestorOf(widget) && takesTab && widget->isVisibleTo(&page) && widget->isEnabled())
+      chain.push_back(widget);
+  }
+  return chain;
+}
+
+/// Pairs that Tab comes to in another order than they are read: from the top down, in a row from the left.
+std::string OrderFaults(PageView& page) {
+  const auto nameOf = [](const QWidget& widget) {
+    return widget.metaObject()->className() + std::string(" ") + FromQt(widget.accessibleName());
+  };
+  /// The parts of the nearest common ancestor in which two widgets stand.
+  const auto placesOf = [](const QWidget& a, const QWidget& b) {
+    const QWidget *partOfA = &a, *partOfB = &b;
+    while (!partOfA->parentWidget()->isAncestorOf(&b)) partOfA = partOfA->parentWidget();
+    while (!partOfB->parentWidget()->isAncestorOf(&a)) partOfB = partOfB->parentWidget();
+    return std::pair(partOfA->geometry(), partOfB->geometry());
+  };
+  std::string faults;
+  const std::vector<QWidget*> chain = TabChain(page);
+  for (std::size_t i = 0; i < chain.size(); ++i)
+    for (std::size_t k = i + 1; k < chain.size(); ++k) {
+      if (chain[i]->isAncestorOf(chain[k]) || chain[k]->isAncestorOf(chain[i])) continue;
+      const auto [first, second] = placesOf(*chain[i], *chain[k]);
+      const bool isInRow = first.top() < second.center().y() && second.top() < first.center().y();
+      if (isInRow ? second.right() <= first.left() : second.bottom() <= first.top())
+        faults += nameOf(*chain[i]) + " before " + nameOf(*chain[k]) + "\n";
+    }
+  return faults;
+}
+
+TEST(PageView, TheTabKeyFollowsTheLookOfEveryPage) {
+  std::size_t count = 0;
+  for (const char* sections : test::kRichSetups) {
+    OpenedSetup setup(sections);
+    for (const std::string& path : test::PagesOf(setup, kSetupDataTree)) {
+      SCOPED_TRACE(path);
+      setup.GoTo(path);
+      for (int i = 0; i < 3; ++i) QApplication::processEvents();
+      EXPECT_EQ(OrderFaults(ShownPage(setup)), "");
+      count += TabChain(ShownPage(setup)).size();
+    }
+  }
+  EXPECT_GT(count, 500U);
+}
+
 // ---- Pictures
 
 /// What is cut or lies over something else on the page that is shown.
 std::string Faults(PageView& page) {
-  std::string faults;
-  const auto tell = [&](const QWidget& widget, const QString& text, const char* what) {
-    faults += FromQt(QString("\"%1\" %2 (%3x%4)\n").arg(text, what).arg(widget.width()).arg(widget.height()));
-  };
-  for (QWidget* widget : page.findChildren<QWidget*>()) {
-    if (!widget->isVisible()) continue;
-    const auto* label = qobject_cast<QLabel*>(widget);
-    const auto* button = qobject_cast<QAbstractButton*>(widget);
-    const auto* list = qobject_cast<QComboBox*>(widget);
-    const QString text = label ? label->text() : button ? button->text() : list ? list->currentText() : QString();
-    if (text.isEmpty()) continue;
-    const int neededHeight =
-        label && label->wordWrap() ? label->heightForWidth(label->width()) : widget->sizeHint().height();
-    const bool wraps = label && label->wordWrap();
-    if (!wraps && widget->width() < widget->minimumSizeHint().width()) tell(*widget, text, "is cut at the right");
-    if (widget->height() < std::min(neededHeight, widget->minimumSizeHint().height()))
-      tell(*widget, text, "is cut below");
-    const auto siblings = widget->parentWidget()->findChildren<QWidget*>(Qt::FindDirectChildrenOnly);
-    for (const QWidget* sibling : siblings)
-      if (sibling != widget && sibling->isVisible() && !sibling->isWindow() &&
-          sibling->geometry().intersects(widget->geometry()))
-        tell(*widget, text, "lies over something");
-  }
+  std::string faults = test::CutTexts(page);
   if (page.findChild<QScrollArea*>()->horizontalScrollBar()->maximum() > 0)
     faults += "the page is wider than its place\n";
   return faults;
@@ -191,13 +223,13 @@ TEST(PageView, NoPageHasACutLabelOrControlsOverEachOther) {
     double zoom;
     QSize window;
     const char* language;
-  } cases[] = {{1, {1280, 800}, "en"},
-               {1.5, {1280, 800}, "en"},
-               {1, {900, 600}, "en"},
-               {1, {1280, 800}, "de"},
-               {1, {900, 600}, "de"}};
+  } cases[] = {{1, {1280, 800}, "en"},   {1.5, {1280, 800}, "en"}, {1, {900, 600}, "en"}, {2, {1280, 800}, "en"},
+               {1, {1280, 800}, "long"}, {1, {1280, 800}, "de"},   {1, {900, 600}, "de"}};
   for (const auto& [zoom, window, language] : cases) {
-    const ShownLanguage shown(language);
+    const bool isLong = std::string_view(language) == "long";
+    const ShownLanguage shown(isLong ? "en" : language);
+    std::optional<test::LongTexts> texts;
+    if (isLong) texts.emplace();
     Theme::Get().SetZoom(zoom);
     for (const char* sections : test::kRichSetups) {
       OpenedSetup setup(sections, window);

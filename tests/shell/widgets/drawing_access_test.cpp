@@ -5,16 +5,18 @@
 #include <QAbstractButton>
 #include <QAccessible>
 #include <QLineEdit>
+#include <QMenu>
+#include <QMenuBar>
 #include <QTabBar>
 #include <algorithm>
+#include <map>
 #include <set>
 
 #include <gmock/gmock.h>
 
 #include "shell/maps/map_canvas.h"
 #include "shell/maps/map_view.h"
-#include "shell/relief/relief_window.h"
-#include "tests/shell/opened_setup.h"
+#include "tests/shell/all_windows.h"
 #include "tests/shell/rich_setups.h"
 #include "tests/support/preprocessed_run.h"
 
@@ -118,7 +120,7 @@ void ExpectRead(QWidget& window) {
   for (int i = 0; i < 3; ++i) QApplication::processEvents();
   const Reading reading(window);
   EXPECT_THAT(reading.Faults(), testing::IsEmpty());
-  EXPECT_GT(reading.Count(), 3);
+  EXPECT_GT(reading.Count(), 1);
 }
 
 TEST(Accessibility, EveryPageTellsWhatItShows) {
@@ -136,31 +138,39 @@ TEST(Accessibility, EveryPageTellsWhatItShows) {
   }
 }
 
-TEST(Accessibility, EveryTabAndWindowTellsWhatItShows) {
-  OpenedSetup setup(test::Example{"rhone", "rhone.tvd"});
-  MainWindow& window = setup.Window();
-  for (const char* path : {"Topography", "Climate/PrecipitationRate", "CCoverageKvf"}) {
-    if (!setup.Frame().GoToPath(path)) continue;
-    ExpectRead(window);
+/// Letters that lead to several things of a window, or of one of its menus.
+std::string SharedLetters(const QWidget& window) {
+  std::string shared;
+  std::map<QString, QString> letters;
+  const auto add = [&](const QString& text, std::map<QString, QString>& known) {
+    const QString letter = QKeySequence::mnemonic(text).toString();
+    if (letter.isEmpty()) return;
+    const auto [place, isNew] = known.emplace(letter, text);
+    if (!isNew) shared += FromQt(place->second + " and " + text + "\n");
+  };
+  if (const auto* main = qobject_cast<const QMainWindow*>(&window))
+    for (const QAction* menu : main->menuBar()->actions()) add(menu->text(), letters);
+  for (const QWidget* widget : window.findChildren<QWidget*>()) {
+    if (const auto* menu = qobject_cast<const QMenu*>(widget)) {
+      std::map<QString, QString> own;
+      for (const QAction* action : menu->actions()) add(action->text(), own);
+    }
+    if (!widget->isVisible() || widget->window() != &window) continue;
+    if (const auto* button = qobject_cast<const QAbstractButton*>(widget)) add(button->text(), letters);
+    if (const auto* label = qobject_cast<const QLabel*>(widget); label && label->buddy()) add(label->text(), letters);
   }
-  ReliefWindow* ground = window.ShowGround(setup.Frame());
-  ASSERT_TRUE(ground);
-  ExpectRead(*ground);
-  ground->close();
-  setup.Frame().StartFind();
-  QTest::keyClicks(window.focusWidget(), "depth");
-  ExpectRead(window);
-  EXPECT_TRUE(window.CompareWith(setup.Frame(), setup.Folder().File("rhone_quality.tvd")));
-  ExpectRead(window);
-  for (const char* file : {"precipitation.nds0", "dem.nds2", "crops.etv"}) {
-    SCOPED_TRACE(file);
-    const QString path = ToQt(setup.Folder().File(file));
-    EXPECT_TRUE(window.OpenFile(path));
+  return shared;
+}
+
+TEST(Accessibility, EveryTabWindowAndDialogTellsWhatItShows) {
+  int count = 0;
+  test::LookAtAllWindows([&count](const std::string& name, QWidget& window) {
+    SCOPED_TRACE(name);
+    ++count;
     ExpectRead(window);
-    if (QString(file).endsWith("etv")) continue;
-    EXPECT_TRUE(window.EditDataFile(path));
-    ExpectRead(window);
-  }
+    EXPECT_EQ(SharedLetters(window), "");
+  });
+  EXPECT_GT(count, 25);
 }
 
 TEST(Accessibility, AWindowWithoutADocumentTellsWhatItShows) {
