@@ -11,7 +11,8 @@ namespace tervane {
 const QColor kHighlightColor(0xe0, 0x3c, 0x31);
 
 QColor InkColor(bool isDark) { return isDark ? QColor(0xf4, 0xf5, 0xf7) : QColor(0x26, 0x2b, 0x33); }
-QColor EdgeColor(bool isDark) { return isDark ? QColor(0x14, 0x16, 0x1a, 170) : QColor(0xff, 0xff, 0xff, 170); }
+// As opaque as what stands out needs it on cells of any colour.
+QColor EdgeColor(bool isDark) { return isDark ? QColor(0x14, 0x16, 0x1a, 230) : QColor(0xff, 0xff, 0xff, 230); }
 QColor DomainColor(bool isDark) { return isDark ? QColor(0xe3, 0xa6, 0xf5) : QColor(0x7a, 0x1f, 0x8a); }
 
 QColor LineColor(bool isDark) { return isDark ? QColor(0x7c, 0xc4, 0xff) : QColor(0x14, 0x5a, 0xa8); }

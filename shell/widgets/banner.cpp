@@ -11,28 +11,24 @@
 
 namespace tervane {
 
-namespace {
-
-QColor BackgroundOf(Banner::Tone tone, bool isDark) {
+QColor Banner::Ground(Tone tone, bool isDark) {
   switch (tone) {
-    case Banner::Tone::Question:
+    case Tone::Question:
       return isDark ? QColor(0x4a, 0x3d, 0x17) : QColor(0xff, 0xf4, 0xcf);
-    case Banner::Tone::Good:
+    case Tone::Good:
       return isDark ? QColor(0x1f, 0x43, 0x2c) : QColor(0xdc, 0xf3, 0xe2);
-    case Banner::Tone::Bad:
+    case Tone::Bad:
       return isDark ? QColor(0x54, 0x27, 0x24) : QColor(0xfd, 0xe3, 0xe0);
   }
   return {};
 }
-
-}  // namespace
 
 Banner::Banner(const QString& text, const std::vector<Answer>& answers, Tone tone) : text_(text) {
   const Theme& theme = Theme::Get();
   setAutoFillBackground(true);
   setAccessibleName(text);
   QPalette palette = this->palette();
-  palette.setColor(QPalette::Window, BackgroundOf(tone, theme.IsDark()));
+  palette.setColor(QPalette::Window, Ground(tone, theme.IsDark()));
   setPalette(palette);
   auto* row = new QHBoxLayout(this);
   row->setContentsMargins(theme.Scaled(12), theme.Scaled(6), theme.Scaled(8), theme.Scaled(6));

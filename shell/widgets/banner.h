@@ -23,6 +23,9 @@ class Banner : public QFrame {
   /// Any answer closes the banner, and so does its cross.
   Banner(const QString& text, const std::vector<Answer>& answers, Tone tone = Tone::Question);
 
+  /// The ground on which it stands.
+  static QColor Ground(Tone tone, bool isDark);
+
   /// What it tells is of the past, for the reason that is put behind it: it stands back.
   void Age(const QString& reason);
 

@@ -3,13 +3,24 @@
 #include "shell/widgets/theme.h"
 
 #include <QApplication>
+#include <QDir>
+#include <QImage>
+#include <QPainter>
 #include <QPalette>
+#include <QStyle>
+#include <QStyleOption>
 #include <algorithm>
 #include <cmath>
+#include <functional>
+#include <map>
 #include <string>
+#include <vector>
 
 #include <gtest/gtest.h>
 
+#include "shell/maps/map_drawing.h"
+#include "shell/maps/map_palette.h"
+#include "shell/widgets/banner.h"
 #include "shell/widgets/layer_colors.h"
 
 namespace tervane::theme_test {
@@ -76,6 +87,102 @@ TEST_P(ContrastOf, MarksAndLinesStandOutOnTheirGround) {
   for (std::size_t curve = 0; curve < 8; ++curve)
     Expect(kMark, "curve " + std::to_string(curve), CurveColor(curve, Theme::Get().IsDark()),
            colors.color(QPalette::Base));
+}
+
+/// What is seen where one colour lies over another.
+QColor Over(const QColor& color, const QColor& ground) {
+  const auto mix = [part = color.alphaF()](float above, float below) { return above * part + below * (1 - part); };
+  return QColor::fromRgbF(mix(color.redF(), ground.redF()), mix(color.greenF(), ground.greenF()),
+                          mix(color.blueF(), ground.blueF()));
+}
+
+TEST_P(ContrastOf, LinesOfAMapStandOutOnItsPaperAndByTheirEdgesOnEveryGrid) {
+  const bool isDark = Theme::Get().IsDark();
+  const QColor paper = QApplication::palette().color(QPalette::Base);
+  const std::pair<const char*, QColor> lines[] = {{"line", LineColor(isDark)},
+                                                  {"ink", InkColor(isDark)},
+                                                  {"domain", DomainColor(isDark)},
+                                                  {"what stands out", kHighlightColor}};
+  std::vector<QColor> grounds{paper};
+  for (const Ramp ramp :
+       {Ramp::Amounts, Ramp::Terrain, Ramp::VioletToYellow, Ramp::BlueToYellow, Ramp::VioletToOrange, Ramp::Difference})
+    for (const double part : {0.0, 0.25, 0.5, 0.75, 1.0}) grounds.push_back(QColor(RampColor(part, ramp)));
+  for (std::size_t code = 0; code < 12; ++code) grounds.push_back(QColor(CodeColor(code)));
+  for (const auto& [line, ink] : lines) {
+    Expect(kMark, std::string(line) + " on paper", ink, paper);
+    for (const QColor& ground : grounds)
+      Expect(kMark, std::string(line) + " beside its edge", ink, Over(EdgeColor(isDark), ground));
+  }
+}
+
+TEST_P(ContrastOf, BarsBelowADocumentAreRead) {
+  const QColor text = QApplication::palette().color(QPalette::WindowText);
+  for (const auto tone : {Banner::Tone::Question, Banner::Tone::Good, Banner::Tone::Bad})
+    Expect(kText, "bar", text, Banner::Ground(tone, Theme::Get().IsDark()));
+}
+
+/// The colours of a picture, those of most pixels first.
+std::vector<QColor> ColorsOf(const QImage& picture) {
+  std::map<QRgb, int> counts;
+  int all = 0;
+  for (int y = 0; y < picture.height(); ++y)
+    for (int x = 0; x < picture.width(); ++x)
+      if (const QRgb pixel = picture.pixel(x, y); qAlpha(pixel) == 255) ++all, ++counts[pixel];
+  std::vector<std::pair<int, QRgb>> byCount;
+  for (const auto& [pixel, count] : counts)
+    if (count * 20 > all) byCount.emplace_back(count, pixel);
+  std::ranges::sort(byCount, std::greater());
+  std::vector<QColor> colors;
+  for (const auto& [count, pixel] : byCount) colors.emplace_back(pixel);
+  return colors;
+}
+
+TEST_P(ContrastOf, EveryIconStandsOutAndSoDoesTheSignInIt) {
+  const QPalette palette = QApplication::palette();
+  const QStringList drawings = QDir(":/icons").entryList({"*.svg"});
+  EXPECT_GT(drawings.size(), 25);
+  for (const QString& drawing : drawings) {
+    const std::string name = drawing.toStdString();
+    // The program's own picture is no sign within a window.
+    if (drawing == "quarzel.svg") continue;
+    const std::vector<QColor> colors =
+        ColorsOf(Theme::Get().Icon(QString(drawing).remove(".svg")).pixmap(QSize(64, 64), 1.0).toImage());
+    ASSERT_FALSE(colors.empty()) << name;
+    for (const auto role : {QPalette::Window, QPalette::Base, QPalette::AlternateBase, QPalette::Button}) {
+      double best = 0;
+      for (const QColor& color : colors) best = std::max(best, Contrast(color, palette.color(role)));
+      EXPECT_GE(best, kMark) << name << " on " << palette.color(role).name().toStdString();
+    }
+    if (colors.size() > 1) Expect(kMark, name, colors[1], colors[0]);
+  }
+}
+
+TEST_P(ContrastOf, BoxesAndFieldsHaveAnOutlineThatIsSeen) {
+  for (const auto role : {QPalette::Window, QPalette::Base}) {
+    for (const auto element : {QStyle::PE_IndicatorCheckBox, QStyle::PE_IndicatorRadioButton,
+                               QStyle::PE_IndicatorItemViewItemCheck, QStyle::PE_FrameLineEdit}) {
+      QStyleOptionFrame frame;
+      QStyleOptionButton box;
+      QStyleOptionViewItem item;
+      QStyleOption& option = element == QStyle::PE_FrameLineEdit                ? static_cast<QStyleOption&>(frame)
+                             : element == QStyle::PE_IndicatorItemViewItemCheck ? static_cast<QStyleOption&>(item)
+                                                                                : static_cast<QStyleOption&>(box);
+      option.palette = QApplication::palette();
+      option.state = QStyle::State_Enabled | QStyle::State_Off;
+      option.rect = QRect(4, 4, 16, 16);
+      frame.lineWidth = 1;
+      QImage picture(24, 24, QImage::Format_RGB32);
+      const QColor ground = option.palette.color(role);
+      picture.fill(ground);
+      QPainter painter(&picture);
+      QApplication::style()->drawPrimitive(element, &option, &painter);
+      painter.end();
+      // Through the middle of its left side.
+      double best = 0;
+      for (int x = 2; x < 9; ++x) best = std::max(best, Contrast(picture.pixelColor(x, 12), ground));
+      EXPECT_GE(best, kMark) << "element " << element << " on " << ground.name().toStdString();
+    }
+  }
 }
 
 INSTANTIATE_TEST_SUITE_P(Contrast, ContrastOf, testing::Values(Theme::Appearance::Light, Theme::Appearance::Dark));
