@@ -5,6 +5,7 @@
 #include <QHeaderView>
 #include <algorithm>
 
+#include "shell/widgets/data_delegate.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -43,6 +44,7 @@ DifferenceList::DifferenceList(const QString& from, const QString& to) {
   setAlternatingRowColors(true);
   setUniformRowHeights(true);
   setHeaderLabels({tr("Section and key"), tr("Change"), from, to});
+  for (const int column : {2, 3}) setItemDelegateForColumn(column, new DataDelegate(this));
   constexpr int kWidths[] = {0, 90, 190, 190};
   header()->setStretchLastSection(false);
   header()->setSectionResizeMode(0, QHeaderView::Stretch);

@@ -143,7 +143,9 @@ void FindingsView::Show(std::vector<SetupFinding> findings) {
   const bool hasLines = std::ranges::any_of(findings_, [](const SetupFinding& finding) { return finding.line > 0; });
   setColumnHidden(kLineColumn, !hasLines);
   resizeColumnToContents(kPlaceColumn);
-  setColumnWidth(kPlaceColumn, std::min(columnWidth(kPlaceColumn), Theme::Get().Scaled(340)));
+  // What is found needs more room than where it was found.
+  const int widest = std::max(width() * 2 / 5, Theme::Get().Scaled(160));
+  setColumnWidth(kPlaceColumn, std::min({columnWidth(kPlaceColumn), Theme::Get().Scaled(340), widest}));
 }
 
 void FindingsView::Fill(QTreeWidgetItem* item) {

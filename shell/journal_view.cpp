@@ -16,6 +16,7 @@
 #include "core/host.h"
 #include "pages/place_names.h"
 #include "shell/program.h"
+#include "shell/widgets/data_delegate.h"
 #include "shell/widgets/flat_button.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/row_delegate.h"
@@ -74,6 +75,8 @@ JournalView::JournalView(EditSession& session, Host& host, Program& program, std
 
   list_->setHeaderLabels({tr("Time"), tr("By"), tr("Step"), tr("Place"), tr("Before"), tr("After")});
   list_->setItemDelegate(new RowDelegate(list_));
+  for (const int held : {kJournalTime, kJournalBefore, kJournalAfter})
+    list_->setItemDelegateForColumn(held, new DataDelegate(list_));
   list_->setUniformRowHeights(true);
   list_->setAlternatingRowColors(true);
   list_->setFrameShape(QFrame::NoFrame);

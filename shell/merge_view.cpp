@@ -14,6 +14,7 @@
 
 #include "platform/files.h"
 #include "platform/paths.h"
+#include "shell/widgets/data_delegate.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/theme.h"
 
@@ -55,6 +56,8 @@ MergeView::MergeView(MergeFiles files, Host& host)
   table_->horizontalHeader()->setSectionResizeMode(QHeaderView::Stretch);
   table_->horizontalHeader()->setSectionResizeMode(kTake, QHeaderView::ResizeToContents);
   table_->verticalHeader()->hide();
+  for (const int held : {kPlace, kBase, kMine, kTheirs})
+    table_->setItemDelegateForColumn(held, new DataDelegate(table_));
   table_->setSelectionBehavior(QAbstractItemView::SelectRows);
   table_->setEditTriggers(QAbstractItemView::NoEditTriggers);
   table_->setAccessibleName(tr("Conflicts"));

@@ -8,6 +8,7 @@
 #include <QMenu>
 #include <QPainter>
 #include <QSignalBlocker>
+#include <QStyle>
 #include <algorithm>
 #include <array>
 #include <functional>
@@ -41,8 +42,9 @@ class MarkedRowDelegate : public RowDelegate {
     RowDelegate::paint(painter, option, index);
     if (index.data(kNotesRole).toInt() == 0) return;
     // Beside the mark of findings, which has the end of the row.
-    const int size = Theme::Get().Scaled(14), right = option.rect.right() - 2 * size;
-    Theme::Get().Icon("review").paint(painter, right - size / 2, option.rect.center().y() - size / 2, size, size);
+    const int size = Theme::Get().Scaled(14);
+    const QRect place(option.rect.right() - 2 * size - size / 2, option.rect.center().y() - size / 2, size, size);
+    Theme::Get().Icon("review").paint(painter, QStyle::visualRect(option.direction, option.rect, place));
   }
 };
 

@@ -37,6 +37,7 @@ double RoundDepthStep(double step) {
 }  // namespace
 
 DepthColumns::DepthColumns(QWidget* parent) : QWidget(parent) {
+  setLayoutDirection(Qt::LeftToRight);
   setMinimumSize(Theme::Get().Scaled(200), Theme::Get().Scaled(140));
   setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
   DescribeDrawing(*this, {});

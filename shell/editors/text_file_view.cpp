@@ -26,6 +26,7 @@ TextFileView::TextFileView(QWidget* parent) : QWidget(parent), text_(new QPlainT
   column->addWidget(text_, 1);
   column->addWidget(status_);
   text_->setReadOnly(true);
+  text_->setLayoutDirection(Qt::LeftToRight);
   text_->setUndoRedoEnabled(false);
   text_->setAccessibleName(tr("Text of the file"));
   text_->setLineWrapMode(QPlainTextEdit::NoWrap);

@@ -14,6 +14,8 @@ namespace tervane {
 ValueTable::ValueTable() {
   setHorizontalScrollMode(QAbstractItemView::ScrollPerPixel);
   setWordWrap(false);
+  // Columns are those of a map or a chart, values are numbers and dates.
+  setLayoutDirection(Qt::LeftToRight);
   setAccessibleName(tr("Values"));
   verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
   setContextMenuPolicy(Qt::ActionsContextMenu);

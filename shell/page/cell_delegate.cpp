@@ -227,7 +227,10 @@ void CellDelegate::initStyleOption(QStyleOptionViewItem* option, const QModelInd
     option->icon = {};
     option->features &= ~QStyleOptionViewItem::HasDecoration;
   }
-  if (KindAt(index) == CellKind::Check && IsGrey(index)) option->state &= ~QStyle::State_Enabled;
+  const CellKind kind = KindAt(index);
+  if (kind == CellKind::Check && IsGrey(index)) option->state &= ~QStyle::State_Enabled;
+  // Their parts keep their order where texts go from the right.
+  if (kind == CellKind::Number || kind == CellKind::Date || kind == CellKind::File) option->direction = Qt::LeftToRight;
 }
 
 void CellDelegate::paint(QPainter* painter, const QStyleOptionViewItem& option, const QModelIndex& index) const {

@@ -5,6 +5,7 @@
 #pragma once
 
 #include <QEvent>
+#include <QGuiApplication>
 #include <QLabel>
 #include <memory>
 
@@ -33,5 +34,11 @@ QString WithoutMarks(QString text);
 QLabel* NewLabel(const QString& text, int widest);
 /// Undo and redo are the field's own while something typed in it is not entered yet, and the document's otherwise.
 bool LeavesToDocument(QEvent* event);
+
+/// Where lines of a label begin: on the side from which the window is read, whatever the language of its text.
+inline Qt::Alignment AtBegin() {
+  const bool isFromRight = QGuiApplication::layoutDirection() == Qt::RightToLeft;
+  return (isFromRight ? Qt::AlignRight : Qt::AlignLeft) | Qt::AlignAbsolute | Qt::AlignVCenter;
+}
 
 }  // namespace tervane

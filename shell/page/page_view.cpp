@@ -17,6 +17,7 @@
 
 #include "pages/tree_entries.h"
 #include "shell/page/control_widget.h"
+#include "shell/page/control_widgets.h"
 #include "shell/page/group_row.h"
 #include "shell/page/table_view.h"
 #include "shell/widgets/flash_mark.h"
@@ -83,9 +84,11 @@ void PageView::Build(const QString& placeText, const QString& path) {
   bold.setWeight(QFont::DemiBold);
   title->setFont(bold);
   title->setWordWrap(true);
+  title->setAlignment(AtBegin());
   head->addWidget(title);
   auto* place = new QLabel(placeText);
   place->setTextFormat(Qt::PlainText);
+  place->setAlignment(AtBegin());
   QPalette quiet = place->palette();
   quiet.setColor(QPalette::WindowText, theme.QuietColor());
   place->setPalette(quiet);

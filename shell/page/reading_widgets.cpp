@@ -28,6 +28,7 @@ class ShownWidget : public ControlWidget {
   ShownWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
     if (!control.beside) MakeLabel();
     value_ = new QLabel;
+    value_->setAlignment(AtBegin());
     value_->setTextInteractionFlags(Qt::TextSelectableByMouse);
     // As high as a field, so that it is on the line of its label.
     if (!control.beside) value_->setMinimumHeight(QLineEdit().sizeHint().height());
@@ -51,6 +52,7 @@ class NoticeWidget : public ControlWidget {
  public:
   NoticeWidget(CYbSEDlgBase& page, Control& control) : ControlWidget(page, control) {
     text_ = new QLabel;
+    text_->setAlignment(AtBegin());
     text_->setWordWrap(true);
     text_->setTextFormat(Qt::PlainText);
     auto* copy = new QAction(tr("&Copy"), text_);

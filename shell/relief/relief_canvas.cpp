@@ -32,6 +32,7 @@ constexpr int kMetre = 1000;
 
 ReliefCanvas::ReliefCanvas(QWidget* parent) : QWidget(parent) {
   setMouseTracking(true);
+  setLayoutDirection(Qt::LeftToRight);
   setFocusPolicy(Qt::StrongFocus);
   setMinimumSize(Theme::Get().Scaled(240), Theme::Get().Scaled(180));
   setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Expanding);
@@ -85,6 +86,12 @@ void ReliefCanvas::SetExaggeration(double times) {
 void ReliefCanvas::Turn(double heading, double pitch) {
   camera_.heading = std::fmod(camera_.heading + heading + 360, 360);
   camera_.pitch = std::clamp(camera_.pitch + pitch, kFlattest, kSteepest);
+  Move();
+}
+
+void ReliefCanvas::Pan(QPointF by) {
+  isFitted_ = false;
+  camera_.Pan(by.x(), by.y());
   Move();
 }
 
@@ -344,9 +351,7 @@ void ReliefCanvas::mouseMoveEvent(QMouseEvent* event) {
   const bool isPanned = (event->buttons() & (Qt::MiddleButton | Qt::RightButton)) ||
                         (event->buttons() && (event->modifiers() & Qt::ShiftModifier));
   if (isPanned) {
-    isFitted_ = false;
-    camera_.Pan(by.x(), by.y());
-    Move();
+    Pan(by);
   } else if (event->buttons() & Qt::LeftButton) {
     Turn(by.x() * kTurnPerPixel, by.y() * kTurnPerPixel);
   } else {
@@ -363,15 +368,17 @@ void ReliefCanvas::wheelEvent(QWheelEvent* event) {
 }
 
 void ReliefCanvas::keyPressEvent(QKeyEvent* event) {
+  // What is seen moves as on a map: towards the key's side lies more of the ground.
+  const double step = event->modifiers() & Qt::ShiftModifier ? 0.1 * std::min(width(), height()) : 0;
   switch (event->key()) {
     case Qt::Key_Left:
-      return Turn(kTurnPerKey, 0);
+      return step > 0 ? Pan({step, 0}) : Turn(kTurnPerKey, 0);
     case Qt::Key_Right:
-      return Turn(-kTurnPerKey, 0);
+      return step > 0 ? Pan({-step, 0}) : Turn(-kTurnPerKey, 0);
     case Qt::Key_Up:
-      return Turn(0, kTurnPerKey);
+      return step > 0 ? Pan({0, step}) : Turn(0, kTurnPerKey);
     case Qt::Key_Down:
-      return Turn(0, -kTurnPerKey);
+      return step > 0 ? Pan({0, -step}) : Turn(0, -kTurnPerKey);
     case Qt::Key_Plus:
     case Qt::Key_Equal:
       return Zoom(kStepOfZoom);

@@ -34,6 +34,8 @@ class ReliefCanvas : public QWidget {
   void SetExaggeration(double times);
   /// Degrees to the right and downwards.
   void Turn(double heading, double pitch);
+  /// Moves the picture by pixels.
+  void Pan(QPointF by);
   const ReliefPart& Part() const { return part_; }
   void SetPart(const ReliefPart& part);
   void Fit();

@@ -35,6 +35,7 @@ QFont LogFont() {
 
 LogView::LogView(const LogTail& lines, const QString& emptyText) : lines_(lines), emptyText_(emptyText) {
   setFrameShape(QFrame::NoFrame);
+  setLayoutDirection(Qt::LeftToRight);
   setFocusPolicy(Qt::StrongFocus);
   setFont(LogFont());
   DescribeDrawing(

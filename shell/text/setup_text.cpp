@@ -48,6 +48,7 @@ class TextMargin : public QWidget {
 
 SetupText::SetupText(QWidget* parent) : QPlainTextEdit(parent), margin_(new TextMargin(this)) {
   setLineWrapMode(NoWrap);
+  setLayoutDirection(Qt::LeftToRight);
   setAccessibleName(tr("Text of the setup"));
   setTabChangesFocus(true);
   Restyle();

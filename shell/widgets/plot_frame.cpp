@@ -45,6 +45,8 @@ PlotFrame::PlotFrame(Host& host, QWidget* parent) : QWidget(parent), host_(host)
 
 void PlotFrame::Hold(Plot plot) {
   plot_ = std::move(plot);
+  // West is left, and so is what was before, in every language.
+  plot_.widget->setLayoutDirection(Qt::LeftToRight);
   DescribeDrawing(*plot_.widget, [this] { return Description(); });
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);

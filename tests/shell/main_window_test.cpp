@@ -9,10 +9,13 @@
 #include <QPushButton>
 #include <QTabWidget>
 #include <QTreeWidget>
+#include <map>
+#include <optional>
 
 #include <gmock/gmock.h>
 
 #include "shell/changes_dialog.h"
+#include "shell/difference_list.h"
 #include "shell/widgets/banner.h"
 #include "shell/widgets/theme.h"
 #include "tests/shell/all_windows.h"
@@ -113,6 +116,55 @@ TEST(MainWindow, NoWindowHasACutText) {
     EXPECT_GT(count, 25);
   }
   Theme::Get().SetZoom(1);
+}
+
+TEST(MainWindow, ReadFromTheRightDrawingsAndDataStayAsTheyAre) {
+  QApplication::setLayoutDirection(Qt::RightToLeft);
+  std::map<std::string, int> kept;
+  test::LookAtAllWindows([&](const std::string& name, QWidget& window) {
+    SCOPED_TRACE(name);
+    for (int i = 0; i < 3; ++i) QApplication::processEvents();
+    EXPECT_EQ(test::CutTexts(window), "");
+    for (const QWidget* widget : window.findChildren<QWidget*>()) {
+      if (!widget->isVisible()) continue;
+      for (const char* drawn : {"tervane::MapCanvas", "QCustomPlot", "tervane::ReliefCanvas", "tervane::SetupText",
+                                "tervane::LogView", "tervane::ValueTable"}) {
+        if (!widget->inherits(drawn)) continue;
+        ++kept[drawn];
+        EXPECT_EQ(widget->layoutDirection(), Qt::LeftToRight) << drawn;
+      }
+      if (widget->inherits("tervane::NodeTree")) {
+        EXPECT_EQ(widget->layoutDirection(), Qt::RightToLeft);
+      }
+    }
+  });
+  QApplication::setLayoutDirection(Qt::LeftToRight);
+  EXPECT_EQ(kept.size(), 6U);
+}
+
+TEST(MainWindow, ReadFromTheRightAValueLooksAsItIsWritten) {
+  const auto drawn = [](Qt::LayoutDirection direction) {
+    DifferenceList list("On disk", "Will be saved");
+    list.setLayoutDirection(direction);
+    list.Show({{SetupDifference::Kind::Changed, "SimSpec", "SIMEND", "2015, 12, 31", "file \"dem.nds2\""}});
+    list.resize(900, 200);
+    list.show();
+    std::vector<QImage> cells;
+    for (const int column : {2, 3}) {
+      QRect place = list.visualRect(list.model()->index(0, column, list.model()->index(0, 0)));
+      // Within the cell it stands at its left or at its right.
+      const QImage cell = list.viewport()->grab(place.adjusted(1, 1, -1, -1)).toImage();
+      int left = cell.width(), right = 0;
+      for (int x = 0; x < cell.width(); ++x)
+        for (int y = 0; y < cell.height(); ++y)
+          if (qGray(cell.pixel(x, y)) < 128) left = std::min(left, x), right = std::max(right, x);
+      cells.push_back(cell.copy(left, 0, right - left + 1, cell.height()));
+    }
+    return cells;
+  };
+  const std::vector<QImage> fromLeft = drawn(Qt::LeftToRight);
+  EXPECT_GT(fromLeft.front().width(), 40);
+  EXPECT_EQ(drawn(Qt::RightToLeft), fromLeft);
 }
 
 TEST(MainWindow, AFileThatAnotherProgramChangedIsNotSavedOverWithoutALook) {

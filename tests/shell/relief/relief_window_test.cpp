@@ -86,6 +86,10 @@ TEST(ReliefWindow, KeysTurnAndHomeShowsEverythingAgain) {
   const ReliefCamera first = relief.Canvas().Camera();
   QTest::keyClick(&relief.Canvas(), Qt::Key_Left);
   EXPECT_GT(relief.Canvas().Camera().heading, first.heading);
+  const ReliefCamera turned = relief.Canvas().Camera();
+  QTest::keyClick(&relief.Canvas(), Qt::Key_Left, Qt::ShiftModifier);
+  EXPECT_EQ(relief.Canvas().Camera().heading, turned.heading);
+  EXPECT_FALSE(relief.Canvas().Camera().centre == turned.centre);
   QTest::keyClick(&relief.Canvas(), Qt::Key_Plus);
   EXPECT_LT(relief.Canvas().Camera().metresPerPixel, first.metresPerPixel);
   QTest::keyClick(&relief.Canvas(), Qt::Key_Home);
