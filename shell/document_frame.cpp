@@ -6,6 +6,7 @@
 #include <QDataStream>
 #include <QFileInfo>
 #include <QIODevice>
+#include <QScreen>
 #include <QSplitter>
 #include <QTabBar>
 #include <QTabWidget>
@@ -42,7 +43,7 @@ namespace tervane {
 
 namespace {
 
-constexpr int kTreeWidth = 270, kPageWidth = 750, kPageHeight = 480, kBottomHeight = 110;
+constexpr int kTreeWidth = 300, kPageWidth = 750, kPageHeight = 480, kBottomHeight = 110;
 constexpr int kAutosaveDelay = 2000;      ///< Milliseconds after the last change.
 constexpr int kDiskInterval = 3000;       ///< Milliseconds between looks at the file on disk.
 constexpr int kProcessedInterval = 1000;  ///< The same at the preprocessor's report.
@@ -64,6 +65,12 @@ QString PlaceText(CYbSEKvfBase& node) {
   if (node.GetParent())
     for (const std::string& title : PlaceNames::TitlesTo(*node.GetParent())) steps << Translated(title);
   return steps.join(" > ");
+}
+
+/// At a large zoom the trees give way to the page.
+int TreeWidthIn(int all) {
+  const int wanted = Theme::Get().Scaled(kTreeWidth);
+  return std::clamp(all - Theme::Get().Scaled(kPageWidth), std::min(wanted, kTreeWidth), wanted);
 }
 
 }  // namespace
@@ -184,7 +191,7 @@ void DocumentFrame::BuildBody() {
   columns_->addWidget(find_);
   columns_->addWidget(rows_);
   columns_->setStretchFactor(1, 1);
-  columns_->setSizes({theme.Scaled(kTreeWidth + 30), theme.Scaled(kPageWidth)});
+  columns_->setSizes({TreeWidthIn(screen()->availableSize().width()), theme.Scaled(kPageWidth)});
   columns_->setChildrenCollapsible(false);
   all_->insertWidget(0, columns_, 1);
   // All bars stand at the foot.
@@ -572,7 +579,8 @@ void DocumentFrame::RestoreLayout(const QByteArray& layout) {
   // The panes at the edges keep their share of the texts; the page has the rest.
   const auto restore = [&](QSplitter& splitter, const QList<int>& sizes, int edge) {
     const int all = sizes[0] + sizes[1];
-    const int kept = std::min(qRound(sizes[edge] * builtZoom_ / zoom), all / 2);
+    int kept = std::min(qRound(sizes[edge] * builtZoom_ / zoom), all / 2);
+    if (edge == 0 && zoom != builtZoom_) kept = std::min(kept, TreeWidthIn(all));
     splitter.setSizes(edge == 0 ? QList<int>{kept, all - kept} : QList<int>{all - kept, kept});
   };
   restore(*columns_, columns, 0);

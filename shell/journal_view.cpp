@@ -20,6 +20,7 @@
 #include "shell/widgets/flat_button.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/row_delegate.h"
+#include "shell/widgets/scrolled_row.h"
 #include "shell/widgets/theme.h"
 
 namespace tervane {
@@ -48,7 +49,8 @@ JournalView::JournalView(EditSession& session, Host& host, Program& program, std
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(0);
-  auto* row = new QHBoxLayout;
+  auto* area = new ScrolledRow;
+  QHBoxLayout* row = &area->Row();
   row->setContentsMargins(4, 2, 4, 2);
   row->setSpacing(Theme::Get().Scaled(8));
   keep_->addItem(tr("No journal is kept"));
@@ -70,7 +72,7 @@ JournalView::JournalView(EditSession& session, Host& host, Program& program, std
                                                       tr("Tables separated by commas (*.csv)"));
     if (!path.isEmpty()) ExportTo(FromQt(path));
   });
-  column->addLayout(row);
+  column->addWidget(area);
   column->addWidget(list_, 1);
 
   list_->setHeaderLabels({tr("Time"), tr("By"), tr("Step"), tr("Place"), tr("Before"), tr("After")});

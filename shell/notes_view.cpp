@@ -30,6 +30,7 @@
 #include "shell/widgets/flat_button.h"
 #include "shell/widgets/qt_text.h"
 #include "shell/widgets/row_delegate.h"
+#include "shell/widgets/scrolled_row.h"
 #include "shell/widgets/theme.h"
 
 namespace tervane {
@@ -95,7 +96,8 @@ NotesView::NotesView(EditSession& session, Host& host, Program& program, NodeOf 
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(0);
-  auto* row = new QHBoxLayout;
+  auto* area = new ScrolledRow;
+  QHBoxLayout* row = &area->Row();
   row->setContentsMargins(4, 2, 4, 2);
   filter_->addItem(tr("All notes"));
   for (const ReviewState state : {ReviewState::Open, ReviewState::Answered, ReviewState::Done})
@@ -112,7 +114,7 @@ NotesView::NotesView(EditSession& session, Host& host, Program& program, NodeOf 
   });
   row->addStretch(1);
   export_ = AddFlatButton(*row, tr("Export…"), [this] { Export(); });
-  column->addLayout(row);
+  column->addWidget(area);
   column->addWidget(list_, 1);
 
   list_->setHeaderLabels({tr("State"), tr("Place"), tr("Note"), tr("By"), tr("Date")});

@@ -39,6 +39,7 @@ namespace tervane {
 namespace {
 
 constexpr int kListWidth = 230, kPlotHeight = 430, kTableHeight = 260;
+constexpr int kLeastBelow = 90;
 constexpr int kDateWidth = 150;
 constexpr int kRest = 150;           ///< Milliseconds after which a step is no longer one that passes.
 constexpr int kDiskInterval = 2000;  ///< Milliseconds between looks at the file on disk.
@@ -189,6 +190,8 @@ QWidget* DataViewer::BuildBody() {
   below_->addTab(values, tr("Values"));
   below_->addTab(cells_, tr("At Cells"));
   below_->addTab(profile_, tr("Along Line"));
+  // A chart that is not shown asks for no room; what is shown is given more by the line above it.
+  below_->setMinimumHeight(Theme::Get().Scaled(kLeastBelow));
   split_->addWidget(plots_);
   split_->addWidget(below_);
   split_->setStretchFactor(0, 1);

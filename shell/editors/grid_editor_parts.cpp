@@ -21,6 +21,7 @@
 #include "shell/editors/edit_table.h"
 #include "shell/editors/grid_editor.h"
 #include "shell/widgets/qt_text.h"
+#include "shell/widgets/scrolled_row.h"
 #include "shell/widgets/theme.h"
 
 namespace tervane {
@@ -29,7 +30,9 @@ QWidget* GridEditor::BuildTools() {
   auto* all = new QWidget;
   auto* column = new QVBoxLayout(all);
   column->setContentsMargins(0, 0, 0, 0);
-  auto* choices = new QHBoxLayout;
+  auto* choicesArea = new ScrolledRow;
+  QHBoxLayout* choices = &choicesArea->Row();
+  choices->setContentsMargins(0, 0, 0, 0);
   items_ = new QComboBox;
   items_->setAccessibleName(tr("Item"));
   layers_ = new QComboBox;
@@ -46,9 +49,11 @@ QWidget* GridEditor::BuildTools() {
   for (QWidget* widget : std::initializer_list<QWidget*>{layerLabel_, layers_, stepLabel_, step_, date_})
     choices->addWidget(widget);
   choices->addStretch();
-  column->addLayout(choices);
+  column->addWidget(choicesArea);
 
-  auto* row = new QHBoxLayout;
+  auto* toolsArea = new ScrolledRow;
+  QHBoxLayout* row = &toolsArea->Row();
+  row->setContentsMargins(0, 0, 0, 0);
   row->setSpacing(Theme::Get().Scaled(3));
   tools_ = new QActionGroup(this);
   struct Named {
@@ -100,7 +105,7 @@ QWidget* GridEditor::BuildTools() {
   row->addWidget(widthLabel_);
   row->addWidget(width_);
   row->addStretch();
-  column->addLayout(row);
+  column->addWidget(toolsArea);
   for (const auto& [key, by] : {std::pair(Qt::Key_BracketLeft, -1), std::pair(Qt::Key_BracketRight, 1)}) {
     auto* action = new QAction(this);
     action->setShortcut(QKeySequence(key));
