@@ -7,6 +7,7 @@
 #include <QLineEdit>
 #include <QMenu>
 #include <QMenuBar>
+#include <QStatusBar>
 #include <QTabBar>
 #include <algorithm>
 #include <map>
@@ -16,6 +17,7 @@
 
 #include "shell/maps/map_canvas.h"
 #include "shell/maps/map_view.h"
+#include "shell/widgets/banner.h"
 #include "tests/shell/all_windows.h"
 #include "tests/shell/rich_setups.h"
 #include "tests/support/preprocessed_run.h"
@@ -194,6 +196,26 @@ TEST(Accessibility, AFieldTellsItsUnitAndWhatIsWrongWithIt) {
   EXPECT_THAT(read(QAccessible::Description), testing::HasSubstr("Not taken"));
   setup.Press(Qt::Key_Escape);
   EXPECT_THAT(read(QAccessible::Description), testing::Not(testing::HasSubstr("Not taken")));
+}
+
+TEST(Accessibility, FindingsSavesAndBarsAreTold) {
+  OpenedSetup setup(
+      "section SimSpec {\nsection ModelComp {\nWQ = 1\nUseCurrentWmSimulation = 0\n}\n}\n"
+      "section ModelCompWQ {\nsection SimulationPeriodWQ {\nSimStart = 2000, 1, 1, 0, 0\n}\n}");
+  const auto findings = [&] { return FromQt(setup.Frame().findChild<FindingsView*>()->accessibleName()); };
+  const std::string before = findings();
+  EXPECT_THAT(before, testing::HasSubstr("Findings ("));
+  setup.GoTo("SimSpec/SimulationPeriod:SIMSTART");
+  setup.Type("2000-01-20");
+  setup.Press(Qt::Key_Return);
+  EXPECT_NE(findings(), before) << "another number of findings";
+  setup.Command("Save");
+  EXPECT_THAT(FromQt(setup.Window().statusBar()->accessibleName()), testing::HasSubstr("Saved as "));
+  setup.Folder().Write("karup.tvd", test::SetupText(14, {}));
+  setup.Frame().CheckDisk();
+  std::vector<std::string> bars;
+  for (const Banner* bar : setup.Frame().findChildren<Banner*>()) bars.push_back(FromQt(bar->accessibleName()));
+  EXPECT_THAT(bars, testing::Contains(testing::HasSubstr("Another program has changed the file")));
 }
 
 TEST(Accessibility, AMapIsADrawingThatTellsWhatIsPointedAt) {
