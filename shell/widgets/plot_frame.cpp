@@ -5,8 +5,10 @@
 #include <QApplication>
 #include <QBuffer>
 #include <QClipboard>
+#include <QFocusEvent>
 #include <QHBoxLayout>
 #include <QLabel>
+#include <QPainter>
 #include <QToolButton>
 #include <QVBoxLayout>
 #include <utility>
@@ -37,6 +39,40 @@ class StatusLabel : public QLabel {
   QSize minimumSizeHint() const override { return {0, QLabel::minimumSizeHint().height()}; }
 };
 
+/// A frame around a plot that the keyboard has come to.
+class FocusRing : public QWidget {
+ public:
+  explicit FocusRing(QWidget& plot) : QWidget(&plot) {
+    setObjectName("FocusRing");
+    setAttribute(Qt::WA_TransparentForMouseEvents);
+    setFocusPolicy(Qt::NoFocus);
+    hide();
+    plot.installEventFilter(this);
+  }
+
+ protected:
+  void paintEvent(QPaintEvent* /*event*/) override {
+    QPainter painter(this);
+    const int width = Theme::Get().Scaled(2);
+    painter.setPen(QPen(palette().color(QPalette::Highlight), width, Qt::SolidLine, Qt::SquareCap, Qt::MiterJoin));
+    painter.drawRect(QRectF(rect()).adjusted(width / 2.0, width / 2.0, -width / 2.0, -width / 2.0));
+  }
+  bool eventFilter(QObject* watched, QEvent* event) override {
+    if (event->type() == QEvent::FocusIn) {
+      const Qt::FocusReason reason = static_cast<QFocusEvent*>(event)->reason();
+      // Who has clicked knows where he is.
+      if (reason == Qt::TabFocusReason || reason == Qt::BacktabFocusReason || reason == Qt::ShortcutFocusReason) {
+        setGeometry(parentWidget()->rect());
+        raise();
+        show();
+      }
+    }
+    if (event->type() == QEvent::FocusOut || event->type() == QEvent::MouseButtonPress) hide();
+    if (event->type() == QEvent::Resize) setGeometry(parentWidget()->rect());
+    return QWidget::eventFilter(watched, event);
+  }
+};
+
 }  // namespace
 
 PlotFrame::PlotFrame(Host& host, QWidget* parent) : QWidget(parent), host_(host), status_(new StatusLabel) {
@@ -48,6 +84,7 @@ void PlotFrame::Hold(Plot plot) {
   // West is left, and so is what was before, in every language.
   plot_.widget->setLayoutDirection(Qt::LeftToRight);
   DescribeDrawing(*plot_.widget, [this] { return Description(); });
+  new FocusRing(*plot_.widget);
   auto* column = new QVBoxLayout(this);
   column->setContentsMargins(0, 0, 0, 0);
   column->setSpacing(2);

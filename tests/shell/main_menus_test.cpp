@@ -108,6 +108,10 @@ TEST_F(Tutorial, TheFirstRunNeedsNoMouse) {
       .Until("its page", IsAt("Climate/PrecipitationRate"))
       .To("Map", "F6")
       .Until("it is drawn", [] { return Typist::Told(QAccessible::Description).contains("Shapes: 50"); })
+      .Check([] {
+        const auto* ring = QApplication::focusWidget()->findChild<QWidget*>("FocusRing");
+        EXPECT_TRUE(ring && ring->isVisible()) << "who has come by keys sees where he is";
+      })
       .Press("Ctrl+Right")
       .Until("a polygon is told", [] { return Typist::Told(QAccessible::Description).contains("shape"); })
       .Press("+")
