@@ -16,6 +16,14 @@ constexpr int kDeepest = 50;
 /// Below that, a template says little by itself.
 constexpr std::size_t kFewLetters = 4;
 
+/// The context of texts that come finished.
+constexpr std::string_view kFinished = "Pages";
+
+/// As gettext joins them.
+std::string InContext(std::string_view context, std::string_view english) {
+  return std::string(context).append(1, '\x04').append(english);
+}
+
 bool IsPlaceholder(std::string_view text, std::size_t at) {
   return text[at] == '%' && at + 1 < text.size() && text[at + 1] >= '1' && text[at + 1] <= '9';
 }
@@ -131,14 +139,16 @@ std::vector<std::string> Translations::Templates() const {
 void Translations::Take(const std::string& context, const std::string& english, const std::string& translated,
                         int line) {
   std::vector<char> wanted = PlaceholdersOf(english), given = PlaceholdersOf(translated);
-  const bool isTemplate = context == "Pages" && !wanted.empty();
+  const bool isTemplate = context == kFinished && !wanted.empty();
   if (isTemplate)
     for (std::size_t i = 0; i < wanted.size(); ++i)
       if (wanted[i] != static_cast<char>('1' + i)) return Refuse(line, "%1, %2 ... in this order were expected");
   std::ranges::sort(wanted);
   std::ranges::sort(given);
   if (wanted != given) return Refuse(line, "the translation has other place holders than the text");
-  if (!exact_.emplace(english, translated).second) return Refuse(line, "this text has an entry already");
+  const bool isOfItsOwn = !context.empty() && context != kFinished;
+  if (!exact_.emplace(isOfItsOwn ? InContext(context, english) : english, translated).second)
+    return Refuse(line, "this text has an entry already");
   texts_.push_back(english);
   if (!isTemplate) return;
   Template made;
@@ -163,7 +173,9 @@ void Translations::Refuse(int line, const std::string& why) {
   if (problem_.empty()) problem_ = "line " + std::to_string(line) + ": " + why;
 }
 
-std::optional<std::string> Translations::Exact(std::string_view english) const {
+std::optional<std::string> Translations::Exact(std::string_view english, std::string_view context) const {
+  if (!context.empty())
+    if (const auto own = exact_.find(InContext(context, english)); own != exact_.end()) return own->second;
   const auto found = exact_.find(std::string(english));
   return found == exact_.end() ? std::nullopt : std::optional(found->second);
 }
@@ -172,6 +184,7 @@ std::optional<std::string> Translations::Finished(std::string_view english, int 
   if (auto found = Exact(english)) return found;
   // Numbers and dates are many.
   if (depth > kDeepest || std::ranges::none_of(english, IsLetterByte)) return {};
+  const bool isOfLines = english.find('\n') != std::string_view::npos;
   Pairs pairs;
   AddPairs(english, pairs);
   // The three lists as one, in the order of the templates.
@@ -185,7 +198,9 @@ std::optional<std::string> Translations::Finished(std::string_view english, int 
         list = i;
     if (list == std::size(lists)) break;
     const Template& candidate = templates_[(*lists[list])[next[list]++]];
-    if ((candidate.pairs & ~pairs).any()) continue;
+    // What joins texts joins those of one line.
+    const bool isJoint = candidate.letters < kFewLetters && candidate.literals.size() > 2;
+    if ((isJoint && isOfLines) || (candidate.pairs & ~pairs).any()) continue;
     if (auto found = ByTemplate(candidate, english, depth)) return found;
   }
   return ByLines(english, depth);

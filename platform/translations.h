@@ -25,8 +25,9 @@ class Translations {
 
   /// Empty, or the fault of the catalogue with its line.
   const std::string& Problem() const { return problem_; }
-  /// The entry of a text as it stands in the sources; nothing when there is none.
-  std::optional<std::string> Exact(std::string_view english) const;
+  /// The entry of a text as it stands in the sources; nothing when there is none. Where a text means two things, the
+  /// sources tell which by a context, and that of the entry is the same.
+  std::optional<std::string> Exact(std::string_view english, std::string_view context = {}) const;
   /// The same of a finished text of a page or finding: its own entry, that of the template with the most letters, or
   /// each of its lines by itself. A template of few letters joins texts: without a letter, as "%1:", it holds where
   /// one of its values has a text; with some, as "%1 to %2", where each has one or is a number or date.

@@ -63,7 +63,8 @@ QWidget* GridEditor::BuildTools() {
   const Named named[] = {
       {Tool::Move, tr("Move"), "M", tr("Drag moves the map; a click shows the cell in the table")},
       {Tool::Brush, tr("Brush"), "B", tr("Drag paints the value; the middle button moves the map")},
-      {Tool::Line, tr("Line"), "L", tr("Clicks give the corners of a line that is painted, a double click its end")},
+      {Tool::Line, tr("Line", "drawn"), "L",
+       tr("Clicks give the corners of a line that is painted, a double click its end")},
       {Tool::Polygon, tr("Polygon"), "P",
        tr("Clicks give the corners of an area that is painted, a double click its end")},
       {Tool::Fill, tr("Fill"), "F", tr("A click paints the cells that hang together with one and have its value")},
@@ -224,7 +225,7 @@ EditPanel* GridEditor::BuildPanel() {
 
   panel->Group(tr("Change"));
   auto* operation = panel->Choice(tr("Do:"), tr("To each selected cell, or to all without a selection"),
-                                  {tr("Set"), tr("Add"), tr("Subtract"), tr("Multiply"), tr("Divide"),
+                                  {tr("Set"), tr("Add", "number"), tr("Subtract"), tr("Multiply"), tr("Divide"),
                                    tr("Raise to at Least"), tr("Lower to at Most")});
   auto* operand = panel->Field(tr("Number:"), tr("In the unit of the file"));
   panel->Button(tr("Apply"), tr("Changes the selected cells, or all without a selection"),

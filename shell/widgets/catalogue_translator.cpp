@@ -9,10 +9,11 @@ namespace tervane {
 
 CatalogueTranslator::CatalogueTranslator(const QString& language) : catalogue_(CatalogueOf(FromQt(language))) {}
 
-QString CatalogueTranslator::translate(const char* context, const char* text, const char* /*disambiguation*/,
+QString CatalogueTranslator::translate(const char* context, const char* text, const char* disambiguation,
                                        int /*n*/) const {
   const bool isFinished = std::string_view(context) == "Pages";
-  const auto found = isFinished ? catalogue_.Finished(text) : catalogue_.Exact(text);
+  const auto found =
+      isFinished ? catalogue_.Finished(text) : catalogue_.Exact(text, disambiguation ? disambiguation : "");
   return found ? ToQt(*found) : QString();
 }
 

@@ -41,6 +41,7 @@ TEST(TranslationsTest, ValuesThatAreTextsAndLinesAreTranslatedThemselves) {
   EXPECT_EQ(texts.Finished("a not known, b not known, Grid not known"),
             "a nicht bekannt, b nicht bekannt, Gitter nicht bekannt");
   EXPECT_EQ(texts.Finished("Clay\nGrid\n"), "Clay\nGitter\n");
+  EXPECT_EQ(texts.Finished("Clay:\nGrid:"), "Clay:\nGitter:");
   EXPECT_EQ(texts.Finished("2000-01-01 to 2000-02-01"), "2000-01-01 bis 2000-02-01");
   EXPECT_EQ(texts.Finished("flow to river"), std::nullopt);
   // Nothing is said of values alone.

@@ -36,6 +36,10 @@ TEST(CatalogueTranslatorTest, FindingsAndLabelsAreGermanAndOtherTextsStayAsTheyA
   EXPECT_EQ(Translated(solver), "Tervane hat keinen Löser PCG4.");
   EXPECT_EQ(Translated(label), "Niederschlagsrate");
   EXPECT_EQ(Translated(unknown), "My own layer");
+  // One English word for two things.
+  EXPECT_EQ(QCoreApplication::translate("tervane::GridEditor", "Line"), "Zeile");
+  EXPECT_EQ(QCoreApplication::translate("tervane::GridEditor", "Line", "drawn"), "Linie");
+  EXPECT_EQ(QCoreApplication::translate("tervane::GridEditor", "Layer", "drawn"), "Schicht");
 }
 
 TEST(CatalogueTranslatorTest, EachMenuOfTheGermanWindowIsTranslatedAndHasEachMnemonicOnce) {
