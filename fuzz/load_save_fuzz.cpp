@@ -6,9 +6,8 @@
 #include <cstdint>
 #include <string>
 
-#include "core/kvf.h"
-#include "core/kvf_parser.h"
 #include "document/flow_model_document.h"
+#include "fuzz/asked_items.h"
 #include "fuzz/require.h"
 
 namespace tervane {
@@ -19,38 +18,8 @@ using fuzz::Require;
 constexpr const char* kPath = "/setups/fuzzed.tvd";
 constexpr const char* kFolder = "/setups";
 
-bool IsCountKey(std::string_view name) {
-  return name.find("Count") != std::string_view::npos || name.starts_with("No") || name.starts_with("Num");
-}
-
-/// Sum of the item counts that a file asks for.
-double AskedItems(const KvfSection& section) {
-  double sum = 0;
-  for (const KvfNode* node = section.firstChild; node; node = node->next) {
-    if (const KvfSection* child = AsSection(node)) {
-      sum += AskedItems(*child);
-    } else if (IsCountKey(node->Name()) && node->count > 0) {
-      const KvfParam& count = node->params[0];
-      const double number = count.type == KvfType::Int     ? count.asInt
-                            : count.type == KvfType::Float ? static_cast<double>(count.asFloat)
-                                                           : kvfGetDouble(&count);
-      if (number > 0) sum += number;
-    }
-  }
-  return sum;
-}
-
-/// A count of up to a million items is legal in a file of a few bytes, and costs a second and hundreds of megabytes:
-/// the fuzzer would find nothing but these. Above this number it learns nothing new.
-constexpr double kMostItems = 2000;
-
-bool AsksForTooMuch(std::string_view input) {
-  KvfFile file;
-  return ParseKvf(FileContent::Of(input), file) && AskedItems(file.top) > kMostItems;
-}
-
 void Check(std::string_view input) {
-  if (AsksForTooMuch(input)) return;
+  if (fuzz::AsksForTooMuch(input)) return;
   CFlowModelDoc first;
   if (!first.OpenText(input, kPath)) return Require(!first.Error().empty(), "a refused setup has a reason");
   const int valid = first.Root().Validate();

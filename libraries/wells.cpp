@@ -191,7 +191,14 @@ std::string ReadWellTable(const std::string& path, WellImport& import) {
     filter.values[kFilterTop] = *top;
     filter.values[kFilterBottom] = *bottom;
     filter.file = text(kFileHead);
-    if (const auto item = number(kItemHead)) filter.item = static_cast<int>(*item);
+    if (const auto item = number(kItemHead)) {
+      constexpr double kMostItems = 1'000'000;
+      if (*item < 1 || *item > kMostItems || *item != std::trunc(*item)) {
+        refuse(fmt::format("the item of {} is \"{}\", a whole number from 1 was expected", name, text(kItemHead)));
+        continue;
+      }
+      filter.item = static_cast<int>(*item);
+    }
     import.wells.entries[*place].rows.push_back(std::move(filter));
   }
   if (reader.IsQuoteOpen()) return fmt::format("{}:{}: a quote is not closed", path, reader.Line());
