@@ -70,7 +70,8 @@ void DocumentFrame::ShowNotesOnPage() {
 
 bool DocumentFrame::ShowBelow(const QString& title) {
   for (int tab = 0; tab < bottomTabs_->count(); ++tab)
-    if (bottomTabs_->tabText(tab) == title) return bottomTabs_->setCurrentIndex(tab), true;
+    // Behind a title may stand how many lines there are: "Notes (2)".
+    if (bottomTabs_->tabText(tab).section(" (", 0, 0) == title) return bottomTabs_->setCurrentIndex(tab), true;
   return false;
 }
 

@@ -68,6 +68,23 @@ class CheckFixes : public testing::Test {
     more.insert(more.begin(), {"check", file, "--fix"});
     return Tervane(more);
   }
+  /// A domain of 10 by 10 cells over a shape file of one square kilometre in UTM zone 32.
+  CCatchmentKvf& DomainOfSquare(CFlowModelDoc& document) const {
+    CTvnShapeData shapes;
+    shapes.Create(ShapeKind::Polygon, {{"CODE", AttributeKind::Whole}}, "EPSG:32632");
+    const double x = 500'000, y = 5'000'000;
+    shapes.AddShape(
+        {{{x, y}, {x, y + 1000}, {x + 1000, y + 1000}, {x + 1000, y}, {x, y}}, {}, {}, {0}, {std::int64_t{1}}});
+    test::Require(shapes.SaveShapeFile(folder.File("domain.shp")).error);
+    CCatchmentKvf& domain = *document.Root().Important(kDomain);
+    domain.Type = CCatchmentKvf::kShapeFile;
+    domain.ShapeFile().Choose(FileName("domain.shp", folder.Path()), {});
+    domain.nxShp = domain.nyShp = 10;
+    domain.sizeShp = 100;
+    domain.x0Shp = x;
+    domain.y0Shp = y;
+    return domain;
+  }
   std::string Value(const std::string& path) const { return Tervane({"get", file, path}).out; }
 
   test::TempFolder folder;
@@ -177,18 +194,8 @@ TEST_F(CheckFixes, ValuesOutsideWhatIsAllowedBecomeTheNearest) {
 }
 
 TEST_F(CheckFixes, TheDomainTakesTheProjectionOfItsShapes) {
-  CTvnShapeData shapes;
-  shapes.Create(ShapeKind::Polygon, {{"CODE", AttributeKind::Whole}}, "EPSG:32632");
-  const double x = 500'000, y = 5'000'000;
-  shapes.AddShape(
-      {{{x, y}, {x, y + 1000}, {x + 1000, y + 1000}, {x + 1000, y}, {x, y}}, {}, {}, {0}, {std::int64_t{1}}});
-  test::Require(shapes.SaveShapeFile(folder.File("domain.shp")).error);
   CFlowModelDoc document;
-  CCatchmentKvf& domain = *document.Root().Important(kDomain);
-  domain.Type = CCatchmentKvf::kShapeFile;
-  domain.ShapeFile().Choose(FileName("domain.shp", folder.Path()), {});
-  domain.x0Shp = x;
-  domain.y0Shp = y;
+  CCatchmentKvf& domain = DomainOfSquare(document);
   domain.MapProjShp = "EPSG:32633";
   ASSERT_TRUE(document.OnSaveDocument(file)) << document.Error();
   EXPECT_THAT(Fix().out,
@@ -198,23 +205,11 @@ TEST_F(CheckFixes, TheDomainTakesTheProjectionOfItsShapes) {
 
 TEST_F(CheckFixes, AFileInAnotherSystemIsConvertedBesideItself) {
   CFlowModelDoc document;
-  CCatchmentKvf& domain = *document.Root().Important(kDomain);
-  CTvnShapeData shapes;
-  shapes.Create(ShapeKind::Polygon, {{"CODE", AttributeKind::Whole}}, "EPSG:32632");
-  const double x = 500'000, y = 5'000'000;
-  shapes.AddShape(
-      {{{x, y}, {x, y + 1000}, {x + 1000, y + 1000}, {x + 1000, y}, {x, y}}, {}, {}, {0}, {std::int64_t{1}}});
-  test::Require(shapes.SaveShapeFile(folder.File("domain.shp")).error);
-  domain.Type = CCatchmentKvf::kShapeFile;
-  domain.ShapeFile().Choose(FileName("domain.shp", folder.Path()), {});
-  domain.nxShp = domain.nyShp = 10;
-  domain.sizeShp = 100;
-  domain.x0Shp = x;
-  domain.y0Shp = y;
+  CCatchmentKvf& domain = DomainOfSquare(document);
   domain.MapProjShp = "EPSG:32632";
   // The same ground in the next zone, where it lies 6 degrees from the middle.
   const CYbProjectionChange change("EPSG:32633", "EPSG:32632");
-  double otherX = x, otherY = y;
+  double otherX = domain.x0Shp, otherY = domain.y0Shp;
   ASSERT_TRUE(change.Back(otherX, otherY));
   CTvn2DOrthoRotatedGridData grid;
   ASSERT_EQ(grid.SetGridData({40, 40, 100, otherX - 1500, otherY - 1500, 0, "EPSG:32633"}, 5, kUsualDeleteValue, 1000,
